@@ -1,0 +1,60 @@
+// Every setting of a run: plain data that all floors from workspace/ up may read.
+#pragma once
+
+#include <map>
+#include <string>
+#include <vector>
+
+#include "macro/mpfw_parser.h"
+
+namespace qrex {
+
+enum class RunMode { Clean, Compile, Build, Gen, Show };
+
+enum class CompilerKind { vc6, vc8, vc9, vc10, vc11, vc12, vc14, gcc, winegcc, clang };
+inline bool IsVisualCpp(CompilerKind kind) { return kind < CompilerKind::gcc; }
+inline bool IsGccFamily(CompilerKind kind) { return kind >= CompilerKind::gcc; }
+std::string_view CompilerKeyword(CompilerKind kind);  // "vc6" .. "clang"
+
+struct PlatformEnvironment {
+  std::string PATH, INCLUDE, LIB;  // `;`-separated lists
+};
+
+struct ConfigSettings {
+  SourceFileList sourceFiles;  // every file loaded through the macro layer in this run
+  MpfwContext context{sourceFiles};
+  std::vector<std::string> virtualTree;
+  std::string exportLib;
+  std::string exportTranslatedInclude;
+  std::string exportUntranslatedInclude;
+  std::vector<std::string> workspaces;
+  std::string systemName, systemProcessor, systemVersion, sizeofPointer;
+  std::string platform, config;
+  std::string compileFilePath;
+  bool defaultToDll = true;
+  bool diagnostics = false;
+  CompilerKind compiler = CompilerKind::vc8;
+  bool targetXP = false;
+  bool translateOnly = false;
+  bool rebuildAll = false;
+  bool writeTokenEquivalent = true;
+  bool exportPublicHeaders = true;
+  bool repackageExecutableTargets = true;
+  bool solutionContainsPrepackagedProjects = true;
+  bool makeTranslatedFilesReadOnly = true;
+  bool makeExportedHeaderFilesReadOnly = true;
+  RunMode mode = RunMode::Build;
+  std::map<std::string, PlatformEnvironment> platformEnvironments;
+
+  const PlatformEnvironment* Environment() const;  // of `platform`, or null
+};
+
+// Sets the process variables PATH (entries joined with the system's own separator), INCLUDE and LIB.
+void ApplyEnvironment(const PlatformEnvironment& environment);
+
+// The first of: the path as given, each import path joined with it, each virtualTree root joined with it, that exists.
+bool FindImport(const ConfigSettings& settings, const std::string& path, std::string& found);
+// The first virtualTree root under which the path exists, and the full path there.
+bool FindInTree(const ConfigSettings& settings, const std::string& path, std::string& root, std::string& fullPath);
+
+}  // namespace qrex

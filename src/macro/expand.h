@@ -1,0 +1,28 @@
+// The macro parser: copies a text to a sink token by token and acts on @ directives, macro and variable names, and
+// $(name) in double-quoted strings. One routine calls itself for every nested body; there is no tree.
+#pragma once
+
+#include <string>
+
+#include "macro/frame.h"
+#include "macro/source_map.h"
+
+namespace qrex {
+
+class ImportHandler {
+ public:
+  virtual bool ImportPath(const std::string& path, const char* position);                  // false: not supported here
+  virtual bool Import(LSFrame& frame, const std::string& path, const char* position) = 0;  // false: not found
+  virtual ~ImportHandler() = default;
+};
+
+void Expand(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent, int64_t outIndent,
+            ExpansionSink& sink);
+std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent = 0,
+                           int64_t outIndent = 0);
+// The entry for whole files.
+std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                                  int64_t outIndent, SourceMap& map);
+std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type);
+
+}  // namespace qrex

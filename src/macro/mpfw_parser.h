@@ -1,0 +1,60 @@
+// Joins the macro layer to the configuration, workspace and project languages: loads files, keeps them in memory,
+// answers imports, and reads what these languages have in common.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "macro/expand.h"
+#include "macro/expression_parser.h"
+#include "macro/frame.h"
+#include "macro/source_map.h"
+
+namespace qrex {
+
+// A loaded file. Never released before the run's end: macro bodies and error positions point into its text.
+struct MpfwSourceFile {
+  virtual ~MpfwSourceFile() = default;
+  std::string path;
+  std::string text;
+  std::string expansion;
+  SourceMap map;
+};
+
+struct MpfwContext {
+  explicit MpfwContext(SourceFileList& sourceFiles) : sourceFiles(sourceFiles) {}
+  SourceFileList& sourceFiles;
+  LSFileFrame rootFrame;
+  std::vector<std::string> importPaths;
+};
+
+class MpfwParser : public ExpressionParser, public ImportHandler {
+ public:
+  explicit MpfwParser(MpfwContext& context) : context(context) {}
+
+  bool ImportPath(const std::string& path, const char* position) override;
+  bool Import(LSFrame& frame, const std::string& path, const char* position) override;
+  virtual std::unique_ptr<MpfwSourceFile> CreateSourceFile();
+  virtual bool ResolveImport(const std::string& path, std::string& found) = 0;
+  virtual void OnImportedFile(MpfwSourceFile& file) = 0;
+
+  // Null if the macro expansion failed (already reported). Throws "Couldn't open file ".
+  MpfwSourceFile* LoadSourceFile(const std::string& path, const std::string& extraText = {});
+
+  void SubstituteVariables(std::string& text) const;
+  void ReadString(std::string& out);              // does not advance
+  void ReadPath(std::string& out);                // does not advance
+  void ReadStringOrExpression(std::string& out);  // advances
+  void ReadNamedString(const std::string& name, std::string& out);
+  void ReadNamedPath(const std::string& name, std::string& out);
+  bool ParseImportStatement();
+  bool ParseVariableStatement(std::string* name = nullptr, std::string* value = nullptr);
+
+ protected:
+  // Runs `loop` (a derived parser over the file's expansion) and reports as an import does: the inner error is written,
+  // and "while processing @import of " is raised at the @import.
+  MpfwContext& context;
+};
+
+}  // namespace qrex

@@ -1,0 +1,97 @@
+// The file system layer. All paths are UTF-8; a path that is not valid UTF-8 raises StringConversionException.
+// Operations answer by result (false, 0, empty); only File and OFileStream raise FileException.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+#include <memory>
+#include <string>
+#include <string_view>
+
+#include "text/exceptions.h"
+#include "text/streams.h"
+
+namespace qrex {
+
+bool FileExists(const std::string& path);  // false for a directory and for a file that cannot be opened for reading
+bool DeleteFile(const std::string& path);
+bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);
+bool CreateEmptyFile(const std::string& path, bool keepExisting);
+void CreateDirectories(const std::string& path, bool includeLast);
+bool SetReadOnly(const std::string& path, bool readOnly);
+int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 when it can't be opened
+bool TouchFile(const std::string& path, bool create);
+bool FullPathOf(const std::string& path, std::string& out);
+bool ReadWholeFile(std::string& out, const std::string& path);
+bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
+
+// Replaces the file as a whole: written beside, then renamed, so that a half-written file never stands under `path`.
+// Raises FileException. A read-only target fails with code 5.
+void ReplaceFile(const std::string& path, std::string_view content);
+
+// A 16-byte header (magic, CRC-32 by IEEE 802.3, signed 64-bit size, all little-endian), then the payload.
+bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path);
+void WriteCheckedFile(uint32_t magic, std::string_view payload, const std::string& path);  // raises FileException
+
+enum class FileMode { Closed = -1, ReadText, WriteText, AppendText, ReadBinary, WriteBinary, AppendBinary };
+
+class IFile : public ISeekableInputStream, public IOutputStream {
+ public:
+  virtual void Close() = 0;
+  virtual bool IsWritable() = 0;
+};
+
+class File : public IFile {
+ public:
+  File() = default;
+  File(const std::string& path, FileMode mode);  // raises FileException with code 2
+  ~File() override;
+  bool Open(const std::string& path, FileMode mode);
+  size_t Read(void* buffer, size_t length) override;
+  int64_t Length() override;  // bytes written so far
+  int64_t Position() override;
+  bool Seek(int64_t position) override;
+  void Write(const void* data, size_t length) override;
+  void Flush() override;
+  void Close() override;
+  bool IsWritable() override;
+
+ private:
+  std::FILE* m_stream = nullptr;
+  FileMode m_mode = FileMode::Closed;
+  std::string m_path;
+  int64_t m_bytesWritten = 0;
+};
+
+class IFileOrDirInfo {
+ public:
+  virtual ~IFileOrDirInfo() = default;
+  virtual bool IsArchive() const = 0;
+  virtual bool IsCompressed() const = 0;
+  virtual bool IsDirectory() const = 0;
+  virtual bool IsEncrypted() const = 0;
+  virtual bool IsHidden() const = 0;
+  virtual bool IsOffline() const = 0;
+  virtual bool IsReadOnly() const = 0;
+  virtual bool IsSparse() const = 0;
+  virtual bool IsSystem() const = 0;
+  virtual int64_t CreationTime() const = 0;
+  virtual int64_t LastAccessTime() const = 0;
+  virtual int64_t LastWriteTime() const = 0;
+  virtual uint32_t SizeLow() const = 0;
+  virtual std::string Name() const = 0;
+};
+
+// The entries of a directory, "." and ".." included, in byte order of their names.
+class FileOrDirIterator {
+ public:
+  explicit FileOrDirIterator(const std::string& pattern);  // "dir/*"
+  ~FileOrDirIterator();
+  const IFileOrDirInfo* Next();  // null at the end; valid until the next call
+
+ private:
+  struct State;
+  std::unique_ptr<State> m_state;
+};
+
+}  // namespace qrex

@@ -1,0 +1,24 @@
+// Path operations on text alone. Paths are UTF-8 with forward slashes and no trailing slash.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "text/text_writer.h"
+
+namespace qrex {
+
+bool IsAbsolutePath(std::string_view path);
+std::string_view FileNameOf(std::string_view path);
+bool StemOf(std::string_view path, std::string& stem);  // false, `stem` untouched: no '.', or an empty stem
+std::string NormalisePath(std::string_view path);       // '\' to '/', one trailing '/' removed
+bool HasExtension(std::string_view path, std::string_view extension);
+bool ReplaceExtension(std::string_view path, std::string_view extension, std::string& out);
+std::string PathJoin(std::string_view left, std::string_view right);
+std::string PathJoin3(std::string_view a, std::string_view b, std::string_view c);
+std::string RelativePath(std::string_view target, std::string_view base);
+void ToBackslashes(TextWriter& writer, std::string_view path);
+bool EqualIgnoringCase(std::string_view a, std::string_view b);
+bool StartsWithIgnoringCase(std::string_view text, std::string_view prefix);
+
+}  // namespace qrex

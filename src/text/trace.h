@@ -1,0 +1,33 @@
+// The process-wide trace log: every TraceWriter ends here.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+
+namespace qrex {
+
+class TraceHook {
+ public:
+  virtual ~TraceHook() = default;
+  virtual void OnTrace(std::string_view text) = 0;
+};
+
+bool OpenTrace(const std::string& path, bool append, bool stampLines);  // "stdout" selects standard output
+void CloseTrace();
+void SetTraceHook(TraceHook* hook);        // not owned; null removes it. Tests capture messages through it
+void WriteToTrace(std::string_view text);  // what a TraceWriter's end calls
+
+// Writes to standard output as UTF-8 through the console writer, unbuffered by the tool.
+void WriteToConsole(std::string_view text);
+
+class TraceIndentScope {
+ public:
+  explicit TraceIndentScope(int64_t columns);
+  ~TraceIndentScope();
+
+ private:
+  int64_t m_columns;
+};
+
+}  // namespace qrex

@@ -1,0 +1,85 @@
+// One file under translation, and what the translator asks of the build that owns it.
+#pragma once
+
+#include <cstdint>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "macro/expand.h"
+#include "macro/frame.h"
+#include "workspace/project_model.h"
+
+namespace qrex {
+
+class NameSpace;
+class ScannedFile;
+
+// The qualified names that each .cpp file registers, by path.
+struct DeclarationRegistry {
+  explicit DeclarationRegistry(bool isRegister) : isRegister(isRegister) {}
+  // Stores the list of a file (an empty list removes the entry) and sets `dirty` when that changed anything.
+  void Update(const std::string& path, const std::vector<std::string>& names);
+
+  bool dirty = false;
+  bool isRegister;
+  std::map<std::string, std::vector<std::string>> entries;
+};
+
+// The project build as the translator sees it; ProjectBuilder implements it.
+class TranslationHost {
+ public:
+  virtual ~TranslationHost() = default;
+  virtual const ConfigSettings& Settings() const = 0;
+  virtual const ProjectConfig& Config() const = 0;
+  virtual ProjectFile* FindFile(const std::string& path) const = 0;  // the workspace's file map; or null
+  virtual ScannedFile& GetScannedFile(ProjectFile& file) = 0;        // created on first need, not translated
+  virtual std::string TranslatedPath(const ScannedFile& file) const = 0;
+  virtual bool RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) = 0;
+  virtual DeclarationRegistry& RegisterMap() = 0;
+  virtual DeclarationRegistry& UnregisterMap() = 0;
+  virtual void CountWarning() = 0;
+  // The scanned file whose source text holds the position, and the line there; false when none does.
+  virtual bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const = 0;
+};
+
+struct TypeRegistration {
+  std::string text;  // the type's C++ spelling
+  std::string code;  // its type code
+  uint32_t flags = 0;
+};
+
+class ScannedFile : public ImportHandler {
+ public:
+  ScannedFile(TranslationHost& host, ProjectFile& file);  // adds the predefined variables to `frame`
+  ~ScannedFile() override;
+
+  // Translates this file, once per run, and writes the output when `needsWriting` is set (and clears it).
+  void WriteGeneratedFile();
+  bool Import(LSFrame& frame, const std::string& path, const char* position) override;
+  ProjectFile* ResolveImport(const std::string& path) const;  // or null
+  std::string SourcePath() const;
+  // The source position of a 1-based line of the generated text; false (with a message) when there is none.
+  bool MapGeneratedLine(int64_t generatedLine, std::string& path, int64_t& line) const;
+
+  TranslationHost& host;
+  ProjectFile& file;
+  std::vector<std::string> registerNames;    // $init
+  std::vector<std::string> unregisterNames;  // $uninit
+  std::vector<TypeRegistration> typeRegistrations;
+  std::vector<const char*> lineTable;  // source position of each generated line, null where unknown
+  bool registered = false;
+  bool needsWriting = false;
+  std::string sourceText;
+  std::string expandedText;
+  std::vector<ScannedFile*> imports;  // direct ones, in order
+  int64_t latestSourceTime = 0;       // caches, 0 while unknown
+  int64_t latestTargetTime = 0;
+  int64_t translationTime = 0;  // when the output was last brought up to date
+  bool translated = false;
+  bool hasDeclarations = false;
+  LSFileFrame frame;
+  std::unique_ptr<NameSpace> rootNameSpace;
+};
+
+}  // namespace qrex

@@ -1,0 +1,37 @@
+// All projects of a run: loading, order, identifiers, and the check that no file belongs to two places.
+#pragma once
+
+#include <map>
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "workspace/project_model.h"
+
+namespace qrex {
+
+class Workspace {
+ public:
+  explicit Workspace(ConfigSettings& settings);
+
+  Project* LoadProject(const std::string& path);  // null when the load failed (already reported)
+  void SortProjects();                            // subprojects first; ties keep the load order
+  void SyncProjectGuids();                        // reads, applies and writes projects.guids
+  bool CheckFileReferences();
+  Project* FindProjectByName(std::string_view name) const;  // or null
+  Project* FindSubproject(std::string_view path) const;     // by the path's stem; or null
+  ProjectFile* FindFile(const std::string& path) const;     // by ProjectFile::path, after CheckFileReferences; or null
+
+  std::vector<std::unique_ptr<Project>> projects;
+  ConfigSettings& settings;
+  MpfwContext context;
+  std::string name;
+  std::string rootDir;
+  std::string relativeDir;
+  std::map<std::string, ProjectFile*> fileMap;
+};
+
+// A project entry without the extension qrpj stands for entry/src/last.qrpj.
+std::string ProjectPathOf(const std::string& entry);
+
+}  // namespace qrex
