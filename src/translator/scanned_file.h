@@ -8,11 +8,11 @@
 
 #include "macro/expand.h"
 #include "macro/frame.h"
+#include "translator/name_space.h"
 #include "workspace/project_model.h"
 
 namespace qrex {
 
-class NameSpace;
 class ScannedFile;
 
 // The qualified names that each .cpp file registers, by path.
@@ -38,15 +38,16 @@ class TranslationHost {
   virtual bool RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) = 0;
   virtual DeclarationRegistry& RegisterMap() = 0;
   virtual DeclarationRegistry& UnregisterMap() = 0;
+  virtual SymbolIndex& Symbols() = 0;  // every declaration of this build
+  virtual size_t NextFileIndex() = 0;  // 0, 1, 2, ...: given to each ScannedFile as it is made
   virtual void CountWarning() = 0;
   // The scanned file whose source text holds the position, and the line there; false when none does.
   virtual bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const = 0;
 };
 
 struct TypeRegistration {
-  std::string text;  // the type's C++ spelling
-  std::string code;  // its type code
-  uint32_t flags = 0;
+  std::string code;                  // the type code
+  const NameSpace* scope = nullptr;  // the name space of the declaration
 };
 
 class ScannedFile : public ImportHandler {
@@ -72,12 +73,16 @@ class ScannedFile : public ImportHandler {
   bool needsWriting = false;
   std::string sourceText;
   std::string expandedText;
+  SourceMap expansionMap;
   std::vector<ScannedFile*> imports;  // direct ones, in order
   int64_t latestSourceTime = 0;       // caches, 0 while unknown
   int64_t latestTargetTime = 0;
   int64_t translationTime = 0;  // when the output was last brought up to date
   bool translated = false;
   bool hasDeclarations = false;
+  const size_t index;           // in the build, for FileSet
+  FileSet mounted;              // the files whose declarations are visible here, this one excluded
+  bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
   LSFileFrame frame;
   std::unique_ptr<NameSpace> rootNameSpace;
 };

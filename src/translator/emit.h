@@ -1,0 +1,54 @@
+// The vocabulary of all emitters: scopes that write brackets, and the lists and prefixes that generated text shares. An
+// emitter reads as the text it writes, in order; what must be undone is a scope.
+#pragma once
+
+#include <functional>
+#include <string>
+#include <string_view>
+
+#include "text/text_writer.h"
+#include "translator/name_space.h"
+#include "translator/type_code.h"
+
+namespace qrex {
+
+// "{\n", the content indented by 4, then "}", the suffix, "\n". Block(out, ";") closes a record or class.
+class Block {
+ public:
+  explicit Block(TextWriter& out, std::string_view suffix = {});
+  ~Block();
+  Block(const Block&) = delete;
+  Block& operator=(const Block&) = delete;
+
+ private:
+  TextWriter& m_out;
+  std::string m_suffix;
+};
+
+// Opens the name spaces around an element, outermost first ("namespace N\n{\n"), and closes them ("} // N\n").
+class NameSpaceFrame {
+ public:
+  NameSpaceFrame(TextWriter& out, const NameSpace* innermost);
+  ~NameSpaceFrame();
+
+ private:
+  TextWriter& m_out;
+  std::vector<const NameSpace*> m_path;  // outermost first
+};
+std::vector<const NameSpace*> EnclosingNameSpaces(const NameSpace* innermost);  // below the root, outermost first
+
+std::string ExportPrefix(const NameSpaceElement& element);      // "P_API " for an exported element of a DLL, else ""
+std::string TargetIdentifier(const NameSpaceElement& element);  // X: the project folder with `/` as `_`
+inline std::string_view BoolText(bool value) { return value ? "true" : "false"; }
+inline char BitText(bool value) { return value ? '1' : '0'; }
+
+// Argument lists, all without their parentheses.
+void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "T a,U b"
+void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments);         // "T,U"
+void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);         // "a,b"
+void WriteReturn(TextWriter& out, const TypeCode& returnType);                          // "return " unless void
+
+// Fixed multi-line text: each `$0`..`$9` of the text is replaced by the argument of that index.
+void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments);
+
+}  // namespace qrex

@@ -1,0 +1,134 @@
+// The translator's symbol table: what a declared thing knows about itself, and how names resolve across imported files.
+//
+// A name space's tree is private to its file. Importing a file never copies elements: the imported files become visible
+// ("mounted"), and a name space of the same path in several files is searched as one. Because a file may see thousands
+// of others, nothing is copied per import either: one SymbolIndex per build lists the declarations of each qualified
+// name, and a look-up keeps those whose file stands in the asking file's closure, a bit set.
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <unordered_map>
+#include <vector>
+
+#include "text/text_writer.h"
+
+namespace qrex {
+
+class NameSpace;
+class ScannedFile;
+
+enum class Category { Typedef, Interface, Class, NameSpace, Functor, GlobalFunction, GlobalVar, Variant, Enum };
+enum class TraitsKind { Other, Struct, Class, Adt, Model, Interface, Functor, Variant, Enum };
+enum class DeclStatus { Forward, Deferred, Defined };
+
+// The names that a file registers and unregisters, qualified.
+struct RegistrationLists {
+  std::vector<std::string> registerNames;
+  std::vector<std::string> unregisterNames;
+};
+
+class NameSpaceElement {
+ public:
+  NameSpaceElement(ScannedFile& owner, const char* position, Category category)
+      : owner(owner), position(position), category(category) {}
+  virtual ~NameSpaceElement() = default;
+  NameSpaceElement(const NameSpaceElement&) = delete;
+  NameSpaceElement& operator=(const NameSpaceElement&) = delete;
+
+  virtual std::string_view GetKeyword() const = 0;            // the word behind `$`
+  virtual std::string_view GetReflectedKindName() const = 0;  // suffix of RegisterReflected
+  virtual bool HaveSomethingToRegister() const = 0;
+  virtual void WriteReflectedDefinition(TextWriter& out) = 0;  // the record
+  // The element's text in the reflection tail: comment, name spaces, record, registration function (records.h).
+  virtual void WriteReflection(TextWriter& out, RegistrationLists& lists);
+  virtual DeclStatus GetDeclStatus() const = 0;
+  virtual bool EffectivelyRegistered() const { return m_registered; }
+  virtual void CollectReferences(std::vector<const NameSpaceElement*>& out) const = 0;  // appends
+  virtual bool ContainsMetaData() const { return !metadata.empty(); }
+  virtual void WriteExtraTraits(TextWriter&) const {}  // inside namespace vesk, behind TypeTraits
+
+  const std::string& GetQualifiedName() const;  // a::b::N; a root's elements have their bare name
+
+  ScannedFile& owner;
+  const char* position;  // in the source text
+  std::string name;
+  std::string metadata;  // an encoded list, often empty
+  NameSpace* parent = nullptr;
+  Category category;
+  TraitsKind traitsKind = TraitsKind::Other;
+  DeclStatus status = DeclStatus::Forward;
+  bool m_exported = false;
+  bool m_reflected = false;
+  bool m_registered = false;
+  bool m_strict = false;  // reflected on request, not because a base forces it
+  bool m_nested = false;  // declared inside a class: no TypeTraits
+
+ private:
+  mutable std::string m_qualifiedName;
+};
+
+// A set of files by their index in the build.
+class FileSet {
+ public:
+  void Add(size_t index);
+  void Add(const FileSet& other);
+  bool Has(size_t index) const;
+
+ private:
+  std::vector<uint64_t> m_words;
+};
+
+// Every declaration of the build by qualified name. Kept by NameSpace::Add and the destructor of NameSpace.
+class SymbolIndex {
+ public:
+  void Enter(const std::string& qualifiedName, NameSpaceElement& element);
+  void Remove(const std::string& qualifiedName, const NameSpaceElement& element);
+  const std::vector<NameSpaceElement*>* Find(const std::string& qualifiedName) const;  // or null
+
+ private:
+  std::unordered_map<std::string, std::vector<NameSpaceElement*>> m_elements;
+};
+
+class NameSpace : public NameSpaceElement {
+ public:
+  NameSpace(ScannedFile& owner, NameSpace* parent, std::string name);  // a root has no parent and an empty name
+  ~NameSpace() override;
+
+  std::string_view GetKeyword() const override { return "namespace"; }
+  std::string_view GetReflectedKindName() const override { return {}; }
+  bool HaveSomethingToRegister() const override;
+  void WriteReflectedDefinition(TextWriter&) override {}
+  void WriteReflection(TextWriter& out, RegistrationLists& lists) override;  // each element, in map order
+  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
+  void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
+  bool ContainsMetaData() const override { return false; }
+
+  NameSpaceElement* LookupLocal(std::string_view name);  // own map, with the name spaces that imports bring
+  NameSpaceElement* Lookup(std::string_view name);       // with mounted name spaces; throws "Ambiguous identifier : "
+  NameSpaceElement* LookupPath(std::string_view path);   // a::b::c
+  template <typename T>
+  T* LookupKind(std::string_view name, Category kind) {
+    NameSpaceElement* element = Lookup(name);
+    return element && element->category == kind ? static_cast<T*>(element) : nullptr;
+  }
+  NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name stands for something else
+  NameSpaceElement& Add(std::unique_ptr<NameSpaceElement> element);  // sets `parent`; replaces what the map had
+  bool IsRoot() const { return parent == nullptr; }
+  bool Empty() const { return m_elements.empty(); }
+  const std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>>& Elements() const { return m_elements; }
+
+ private:
+  std::string KeyOf(std::string_view name) const;
+  std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>> m_elements;
+  std::vector<std::unique_ptr<NameSpaceElement>> m_replaced;  // earlier declarations: others may still refer to them
+};
+
+// "$", the keyword, "+" if exported, a blank and the qualified name: "$struct+ a::B". The form of all messages.
+void PrintElement(TextWriter& out, const NameSpaceElement& element);
+std::string PrintedElement(const NameSpaceElement& element);
+
+}  // namespace qrex

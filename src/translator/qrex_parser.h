@@ -1,0 +1,152 @@
+// The translator proper: scans the expanded text of one file, copies plain C++ through, and sends each `$` keyword to
+// its handler. Handlers are free functions `void ParseX(QrexParser&)`, one pair of files per declared kind, in the
+// table of qrex_parser.cpp; this class is what they share: tokens, copying, names, types, warnings.
+//
+// A handler is called with its keyword as the current token and leaves the current token on the last one of its
+// declaration (the main loop reads on from there). It drops source text by moving the copy position forward without
+// copying.
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "macro/expression_parser.h"
+#include "macro/source_map.h"
+#include "text/streams.h"
+#include "translator/name_space.h"
+#include "translator/scanned_file.h"
+#include "translator/type_code.h"
+
+namespace qrex {
+
+// Receives the generated text, and keeps for each generated line the source position that it came from: that of the
+// last source text copied, so that a compiler's error in generated text points at the declaration which produced it.
+class QrexParserOutputStream : public IOutputStream {
+ public:
+  QrexParserOutputStream(IOutputStream& target, std::vector<const char*>& lineTable, TextRange expanded,
+                         const SourceMap& map);
+  void Write(const void* data, size_t length) override;  // generated text
+  void Flush() override;
+  void CopyRange(const char* begin, const char* end);  // source text, bypassing the indentation
+  const char* SourcePosition();                        // mapped position of the last source text copied; null if none
+  const char* SourcePosition(const char* expanded) const;  // mapped position of an address in the expanded text
+  int Column() const { return m_column; }
+
+ private:
+  void CountGenerated(std::string_view text);
+  IOutputStream& m_target;
+  std::vector<const char*>& m_lineTable;
+  TextRange m_expanded;
+  const SourceMap& m_map;
+  MapCursor m_cursor;
+  const char* m_copied = nullptr;
+  int m_column = 0;
+};
+
+class QrexParser : public ExpressionParser {
+ public:
+  QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded);
+
+  void Translate();  // the main loop over the whole text
+
+  // --- Copying. The copy position is how far the expanded text has been dealt with, copied or dropped.
+  void CopyTo(const char* position);
+  void CopyToCurrent() { CopyTo(current.text.begin); }
+  void DropTo(const char* position) { m_copyPosition = position; }
+  void DropToCurrent() { DropTo(current.text.begin); }
+  void DropBehindCurrent() { DropTo(current.text.end); }
+  void Flush() { out.Flush(); }
+
+  // --- Tokens beyond ParserBase.
+  bool Is(std::string_view word) const { return current.text == word; }
+  bool Is(int32_t kind) const { return current.kind == kind; }
+  bool Accept(int32_t kind);  // advances and answers true when the current token is of that kind
+  bool AcceptWord(std::string_view word);
+  std::string RequireIdentifier(std::string_view what = "identifier");  // advances
+  [[noreturn]] void Fail(std::string message) const;                    // at the current token
+  // From an opening bracket to its matching closing one, which becomes the current token. Failure: `atEnd`.
+  void SkipToMatching(int32_t open, int32_t close, std::string_view atEnd);
+  // The same for < >, failing with "Reached end of stream while scanning for matching >".
+  void SkipAngles();
+
+  // --- Names.
+  NameSpaceElement* FindName(std::string_view name);  // the current name space, then the root
+  NameSpaceElement& ParseQualifiedId();
+  void ParseExportModifier(NameSpaceElement& element);
+  bool ParseExportModifier();                       // the bare `+`
+  void ParseQualifiers(NameSpaceElement& element);  // << >> of functions, functors and interfaces; `<<` is current
+  // As above for local flags; `onWhat` ends the failure text (" >> on $type").
+  void ParseQualifierFlags(bool& reflected, bool& registered, std::string_view onWhat, bool* isExtern = nullptr);
+  [[noreturn]] void FailConflict(std::string_view keyword, std::string_view name, const NameSpaceElement& old);
+  [[noreturn]] void FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element);
+  void SeeDeclaration(const NameSpaceElement& element);
+  void RequireIObjectImport();  // "@import of IObject.h required"
+
+  // --- Types (type_parser.cpp). `reflected`: the type must be understood completely.
+  bool ParseTypeWithName(TypeCode& type, std::string* name, bool nameRequired, bool* followedByParen, bool reflected);
+  bool ParseBaseType(TypeCode& type, bool reflected);
+  void ParseFunctionSignature(FunctionSignature& signature, bool constAllowed, bool directionsRequired,
+                              bool polymorphicAllowed, bool reflected);
+  void ParseMethodOrAttribute(bool constAllowed, bool& isAttribute, FunctionSignature& signature, bool ipc,
+                              bool reflected);
+  void ParseFunctionArg(FunctionArg& arg, bool directionsRequired, bool reflected);
+  void ParseMetadataList(std::string& out);  // `[` is current; behind `]` afterwards
+  void ParseMetadataValue(std::string& out);
+  void ParseOptionalMetadata(std::string& out);  // tests for `[`
+
+  // --- Warnings: 18 codes, 1000 + index, that $warning switches on and off.
+  bool WarningOn(int code) const { return m_warnings[static_cast<size_t>(code - 1000)]; }
+  // Position: `address` in the expanded text, else the element's, else where the scanner reads.
+  void ReportWarning(int code, std::string_view text, const NameSpaceElement* element = nullptr,
+                     const char* address = nullptr);
+  void CheckPublicHeader(const NameSpaceElement& element);  // W1009, W1008
+  void CheckReferences(const NameSpaceElement& element);    // W1002
+  void CheckMetadata(const NameSpaceElement& element);      // W1001: non-reflected with metadata
+
+  const char* SourcePosition() {
+    out.Flush();
+    return stream.SourcePosition();
+  }  // where the next declaration stands
+  NameSpace& Current() { return *m_nameSpaces.back(); }
+  NameSpace& Root() { return *m_nameSpaces.front(); }
+  bool AtFileScope() const { return m_nameSpaces.size() == 1; }
+  const Project& GetProject() const { return *file.file.project; }
+
+  ScannedFile& file;
+  QrexParserOutputStream& stream;
+  TextWriter& out;
+  const TextRange expanded;
+
+ private:
+  friend void ParseWarning(QrexParser& parser);
+  using WarningFlags = std::array<bool, 18>;
+
+  bool TranslateHash();
+  bool TranslateAt();
+  void OpenNameSpace();
+  void CloseBrace();
+  void Dispatch();
+  bool ParseDecoratorType(TypeCode& type, bool reflected);
+  void ParseSuffixedType(TypeCode& type, bool reflected);
+
+  const char* m_copyPosition;
+  std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
+  std::vector<int64_t> m_savedDepths;
+  int64_t m_braceDepth = 0;
+  WarningFlags m_warnings;
+  std::vector<WarningFlags> m_savedWarnings;
+  int m_typeDepth = 0;
+};
+
+// Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`.
+void TranslateFile(ScannedFile& file, IOutputStream& target);
+
+// Handlers that other kinds call inside their bodies.
+void ParseNew(QrexParser& parser);
+void ParseMakeFunctor(QrexParser& parser);  // also $makeconstfunctor
+void ParseWarning(QrexParser& parser);
+
+}  // namespace qrex

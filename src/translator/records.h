@@ -1,0 +1,36 @@
+// What all reflection records share: where their text goes, how it is wrapped, and how registration functions of things
+// end in one function per project.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "translator/byte_code.h"
+#include "translator/emit.h"
+#include "translator/name_space.h"
+#include "translator/scanned_file.h"
+
+namespace qrex {
+
+class QrexParser;
+
+// --- Pieces of NameSpaceElement::WriteReflection, for kinds that vary the common shape.
+void WriteReflectionHead(TextWriter& out, const NameSpaceElement& element);  // "\n//### ..." and the target declaration
+void WriteRegistration(TextWriter& out, const NameSpaceElement& element, RegistrationLists& lists);  // if m_registered
+
+// "NAME," or "0," as rows of records have it.
+void WriteNameOrZero(TextWriter& out, bool present, std::string_view name);
+
+// --- At the place of a declaration: closes the open name spaces, writes the TypeTraits block, reopens them.
+void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element);
+
+// --- $type
+void ParseType(QrexParser& parser);
+
+// --- Tails
+// Writes the tails of the imports that this .cpp must register and its own, and stores the lists in the registries.
+void WriteReflectionTails(ScannedFile& file, TextWriter& out);
+// Register_Project_P or Unregister_Project_P.
+void WriteProjectRegistration(const ScannedFile& mainFile, const DeclarationRegistry& registry, TextWriter& out);
+
+}  // namespace qrex
