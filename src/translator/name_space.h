@@ -42,6 +42,7 @@ class NameSpaceElement {
   virtual std::string_view GetKeyword() const = 0;            // the word behind `$`
   virtual std::string_view GetReflectedKindName() const = 0;  // suffix of RegisterReflected
   virtual bool HaveSomethingToRegister() const = 0;
+  virtual bool HasRecord() const { return m_reflected; }
   virtual void WriteReflectedDefinition(TextWriter& out) = 0;  // the record
   // The element's text in the reflection tail: comment, name spaces, record, registration function (records.h).
   virtual void WriteReflection(TextWriter& out, RegistrationLists& lists);

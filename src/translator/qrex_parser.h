@@ -36,7 +36,7 @@ class QrexParserOutputStream : public IOutputStream {
   int Column() const { return m_column; }
 
  private:
-  void CountGenerated(std::string_view text);
+  void CountColumns(std::string_view text);
   IOutputStream& m_target;
   std::vector<const char*>& m_lineTable;
   TextRange m_expanded;
@@ -124,7 +124,7 @@ class QrexParser : public ExpressionParser {
   friend void ParseWarning(QrexParser& parser);
   using WarningFlags = std::array<bool, 18>;
 
-  bool TranslateHash();
+  void CheckInclude();
   bool TranslateAt();
   void OpenNameSpace();
   void CloseBrace();
@@ -146,7 +146,8 @@ void TranslateFile(ScannedFile& file, IOutputStream& target);
 
 // Handlers that other kinds call inside their bodies.
 void ParseNew(QrexParser& parser);
-void ParseMakeFunctor(QrexParser& parser);  // also $makeconstfunctor
+void ParseInit(QrexParser& parser);
+void ParseUninit(QrexParser& parser);
 void ParseWarning(QrexParser& parser);
 
 }  // namespace qrex

@@ -85,6 +85,10 @@ class ScannedFile : public ImportHandler {
   bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
   LSFileFrame frame;
   std::unique_ptr<NameSpace> rootNameSpace;
+
+ private:
+  void WriteTranslation(const std::string& target);
+  void CopySource(const std::string& target) const;
 };
 
 }  // namespace qrex

@@ -1,0 +1,84 @@
+#include "translator/emit.h"
+
+#include <algorithm>
+
+#include "translator/scanned_file.h"
+
+namespace qrex {
+
+Block::Block(TextWriter& out, std::string_view suffix) : m_out(out), m_suffix(suffix) {
+  m_out << "{\n";
+  m_out.Flush();
+  m_out.AddIndent(4);
+}
+
+Block::~Block() {
+  m_out.Flush();
+  m_out.AddIndent(-4);
+  m_out << "}" << m_suffix << "\n";
+}
+
+std::vector<const NameSpace*> EnclosingNameSpaces(const NameSpace* innermost) {
+  std::vector<const NameSpace*> path;
+  for (; innermost && !innermost->IsRoot(); innermost = innermost->parent) path.push_back(innermost);
+  std::reverse(path.begin(), path.end());
+  return path;
+}
+
+NameSpaceFrame::NameSpaceFrame(TextWriter& out, const NameSpace* innermost)
+    : m_out(out), m_path(EnclosingNameSpaces(innermost)) {
+  for (const NameSpace* nameSpace : m_path) m_out << "namespace " << nameSpace->name << "\n{\n";
+}
+
+NameSpaceFrame::~NameSpaceFrame() {
+  for (auto it = m_path.rbegin(); it != m_path.rend(); ++it) m_out << "} // " << (*it)->name << "\n";
+}
+
+std::string ExportPrefix(const NameSpaceElement& element) {
+  const Project& project = *element.owner.file.project;
+  if (!element.m_exported || project.targetType != TargetType::DynamicLinkLibrary) return {};
+  return project.name + "_API ";
+}
+
+std::string TargetIdentifier(const NameSpaceElement& element) { return element.owner.file.project->MangledProjDir(); }
+
+namespace {
+
+template <typename WriteOne>
+void WriteList(TextWriter& out, const std::vector<FunctionArg>& arguments, WriteOne writeOne) {
+  bool first = true;
+  for (const FunctionArg& argument : arguments) {
+    if (!first) out << ",";
+    first = false;
+    writeOne(argument);
+  }
+}
+
+}  // namespace
+
+void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments) {
+  WriteList(out, arguments, [&](const FunctionArg& argument) {
+    PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
+  });
+}
+
+void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments) {
+  WriteList(out, arguments, [&](const FunctionArg& argument) { PrintType(out, argument.type); });
+}
+
+void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments) {
+  WriteList(out, arguments, [&](const FunctionArg& argument) { out << argument.name; });
+}
+
+void WriteReturn(TextWriter& out, const TypeCode& returnType) {
+  if (!IsVoid(returnType)) out << "return ";
+}
+
+void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments) {
+  for (size_t dollar; (dollar = text.find('$')) != std::string_view::npos; text.remove_prefix(dollar + 2)) {
+    out << text.substr(0, dollar) << arguments.begin()[text[dollar + 1] - '0'];
+  }
+  out << text;
+}
+
+}  // namespace qrex

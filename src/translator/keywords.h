@@ -1,0 +1,19 @@
+// The words behind `$` at file level, and their handlers. A new kind adds its handler here.
+#pragma once
+
+#include <span>
+#include <string_view>
+
+namespace qrex {
+
+class QrexParser;
+
+struct Keyword {
+  std::string_view word;
+  void (*parse)(QrexParser& parser);
+  bool advancesItself = false;  // leaves the first token behind its declaration as the current one
+};
+
+std::span<const Keyword> FileLevelKeywords();
+
+}  // namespace qrex

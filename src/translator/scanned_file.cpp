@@ -1,0 +1,216 @@
+#include "translator/scanned_file.h"
+
+#include <algorithm>
+#include <unordered_set>
+
+#include "lex/scanner.h"
+#include "text/files.h"
+#include "text/numbers.h"
+#include "text/output_policy.h"
+#include "text/paths.h"
+#include "text/scope_timer.h"
+#include "translator/name_space.h"
+#include "translator/predefined_variables.h"
+#include "translator/qrex_parser.h"
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr std::string_view kIObjectPath = "Vesk/vxObject/IObject.h";
+constexpr int64_t kHeaderHeadLines = 4;
+
+class BufferStream : public IOutputStream {
+ public:
+  void Write(const void* data, size_t length) override { m_text.append(static_cast<const char*>(data), length); }
+  void Flush() override {}
+  const std::string& Text() const { return m_text; }
+
+ private:
+  std::string m_text;
+};
+
+bool IsTranslatedKind(FileKind kind) {
+  return kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H || kind == FileKind::Asm ||
+         kind == FileKind::Py;
+}
+
+void PrepareTarget(const std::string& path) {
+  CreateDirectories(path, false);
+  ChangeReadOnly(path, false);
+}
+
+bool IsTokenEquivalent(const std::string& path, std::string_view text) {
+  std::string old;
+  if (!ReadWholeFile(old, path)) return false;
+  try {
+    return SameTokens(LexScanner(std::string_view(old)), LexScanner(text));
+  } catch (const LexScannerException&) {
+    return false;  // what stood there is no text of ours
+  }
+}
+
+std::string WithCarriageReturns(const std::string& text) {
+  std::string out;
+  ReplaceAll(text, out, "\n", "\r\n");
+  return out;
+}
+
+// The chain of imports that leads from `from` to `to`, both included; empty when there is none.
+std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const ScannedFile& to) {
+  std::unordered_set<const ScannedFile*> seen{&from};
+  struct Level {
+    const ScannedFile* file;
+    size_t next = 0;
+  };
+  std::vector<Level> path{{&from}};
+  while (!path.empty()) {
+    Level& level = path.back();
+    if (level.file == &to) {
+      std::vector<const ScannedFile*> chain;
+      for (const Level& step : path) chain.push_back(step.file);
+      return chain;
+    }
+    if (level.next == level.file->imports.size()) {
+      path.pop_back();
+    } else {
+      const ScannedFile* import = level.file->imports[level.next++];
+      if (seen.insert(import).second) path.push_back({import});
+    }
+  }
+  return {};
+}
+
+}  // namespace
+
+void DeclarationRegistry::Update(const std::string& path, const std::vector<std::string>& names) {
+  auto found = entries.find(path);
+  if (names.empty()) {
+    if (found == entries.end()) return;
+    entries.erase(found);
+  } else {
+    if (found != entries.end() && found->second == names) return;
+    entries[path] = names;
+  }
+  dirty = true;
+}
+
+ScannedFile::ScannedFile(TranslationHost& host, ProjectFile& file)
+    : host(host),
+      file(file),
+      index(host.NextFileIndex()),
+      rootNameSpace(std::make_unique<NameSpace>(*this, nullptr, "")) {
+  importsIObject = file.path == kIObjectPath;
+  DefinePredefinedVariables(*this);
+}
+
+ScannedFile::~ScannedFile() = default;
+
+std::string ScannedFile::SourcePath() const { return file.project->SourcePath(file); }
+
+ProjectFile* ScannedFile::ResolveImport(const std::string& path) const {
+  const size_t slash = file.path.rfind('/');
+  const std::string directory = slash == std::string::npos ? std::string() : file.path.substr(0, slash);
+  const Project& project = *file.project;
+  for (const std::string& candidate :
+       {PathJoin(directory, path), path, PathJoin(project.rootToProjDir, path), PathJoin(project.sourceDir, path)}) {
+    if (ProjectFile* found = host.FindFile(candidate)) return found;
+  }
+  return nullptr;
+}
+
+bool ScannedFile::Import(LSFrame&, const std::string& path, const char*) {
+  ProjectFile* target = ResolveImport(path);
+  if (!target) return false;
+  ScannedFile& imported = host.GetScannedFile(*target);
+  imported.WriteGeneratedFile();
+
+  // A file in progress is not translated again, so a cycle shows as a chain from the import back to this file.
+  const std::vector<const ScannedFile*> chain = ImportChain(imported, *this);
+  if (!chain.empty()) {
+    TraceWriter trace;
+    trace << "\nERROR: Cycle detected in import directives.  Files in cycle are...\n";
+    trace << "    " << file.path << "\n";
+    for (size_t i = 0; i + 1 < chain.size(); ++i) trace << "    " << chain[i]->file.path << "\n";
+    return false;
+  }
+  frame.AddOrderedImport(imported.frame);
+  imports.push_back(&imported);
+  importsIObject = importsIObject || imported.importsIObject;
+  return true;
+}
+
+void ScannedFile::WriteGeneratedFile() {
+  if (!file.project->usesQrex) {
+    throw LexScannerException("File " + SourcePath() + " is not part of a project using qrex", nullptr);
+  }
+  if (translated) return;
+  translated = true;
+  const std::string target = host.TranslatedPath(*this);
+  if (IsTranslatedKind(file.kind)) {
+    WriteTranslation(target);
+  } else if (needsWriting) {
+    needsWriting = false;
+    CopySource(target);
+    translationTime = CurrentFileTime();
+  }
+}
+
+void ScannedFile::WriteTranslation(const std::string& target) {
+  if (!LoadText(sourceText, SourcePath(), true)) {
+    throw LexScannerException("Couldn't open file " + SourcePath(), nullptr);
+  }
+  registerNames.clear();
+  unregisterNames.clear();
+  typeRegistrations.clear();
+  imports.clear();
+  BufferStream generated;
+  TranslateFile(*this, generated);
+
+  if (!needsWriting) return;
+  const ConfigSettings& settings = host.Settings();
+  if (!settings.writeTokenEquivalent && IsTokenEquivalent(target, generated.Text())) {
+    if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
+  } else {
+    if (settings.diagnostics) TraceWriter() << "Writing: " << target << "\n";
+    PrepareTarget(target);
+    ReplaceFile(target, WithCarriageReturns(generated.Text()));
+    if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+  }
+  needsWriting = false;
+  latestTargetTime = 0;
+  translationTime = CurrentFileTime();
+}
+
+void ScannedFile::CopySource(const std::string& target) const {
+  ChangeReadOnly(target, false);
+  CreateDirectories(target, false);
+  if (!CopyFile(SourcePath(), target, false)) {
+    TraceWriter() << "ERROR: Copy file " << SourcePath() << " to " << target << " failed\n";
+    return;
+  }
+  TouchFile(target, false);
+  if (host.Settings().makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+}
+
+bool ScannedFile::MapGeneratedLine(int64_t generatedLine, std::string& path, int64_t& line) const {
+  if (!translated) {
+    TraceWriter() << "\nNOTE: Need @import instead of #include \"" << file.name
+                  << "\" to pinpoint errors in original source files\n";
+    return false;
+  }
+  if (file.kind == FileKind::H) generatedLine -= kHeaderHeadLines;
+  if (generatedLine < 1) return false;
+  const char* position = nullptr;
+  if (!lineTable.empty()) {
+    position = lineTable[std::min<size_t>(static_cast<size_t>(generatedLine), lineTable.size()) - 1];
+  }
+  if (!position) {
+    TraceWriter() << "\nINTERNAL ERROR: convert error position failed because line number invalid\n";
+    return false;
+  }
+  return host.FindSourcePosition(position, path, line);
+}
+
+}  // namespace qrex
