@@ -1,0 +1,23 @@
+// Reading $struct, $class, $adt, $mixin and $model statements. A class body is plain C++ that is copied through, with
+// `$` items taken out and replaced.
+#pragma once
+
+#include <string>
+#include <vector>
+
+#include "translator/class_def.h"
+#include "translator/qrex_parser.h"
+
+namespace qrex {
+
+// The keyword is the current token; leaves it on the closing `;`.
+void ParseClass(QrexParser& parser, ClassKind kind, ClassDef* enclosing);  // `enclosing`: null at file level
+
+// --- Shared with the other kinds that live in classes
+void ParseClassBody(QrexParser& parser, ClassDef& def);  // on `{`; leaves it on the matching `}`
+void ParseFieldOrMethod(QrexParser& parser, ClassDef& def);
+bool ParseQualifierList(QrexParser& parser, ClassDef& def);  // behind `<<`; true when some entry needs reflection
+void WriteForwardDeclaration(TextWriter& out, const ClassDef& def);
+void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def);
+
+}  // namespace qrex
