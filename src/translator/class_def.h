@@ -83,7 +83,7 @@ class ClassDef : public NameSpaceElement, public TypeBehaviour {
   bool AutoGenerateInsertionToXostream() const;
   bool IsIObjectVisitable() const override;
   bool IsPrefVisitable() const override;
-  bool CanSerialise() const override { return HasSerialise(); }  // as a field's type
+  bool CanSerialise() const override;  // as a type of fields
   uint32_t TypeOpsBits() const;
 
   // --- Its model (model.h)
@@ -123,11 +123,12 @@ class ClassDef : public NameSpaceElement, public TypeBehaviour {
   std::string m_templateArgNames;  // "T,N"
   std::string m_mixinBaseClass;    // text of the generated base, empty without one
   bool m_haveModelDefaultCtor = false;
-  bool m_inheritsModel = false;                               // the class derives from a model mixin
-  std::string m_deferredText;                                 // written into the reflection tail
-  std::vector<std::unique_ptr<ClassDef>> m_anonymousClasses;  // of the mixin list: in no name space
+  bool m_inheritsModel = false;                                    // the class derives from a model mixin
+  std::string m_deferredText;                                      // written into the reflection tail
+  std::vector<std::unique_ptr<NameSpaceElement>> m_ownedElements;  // nested ones and anonymous mixins: in no name space
 
  private:
+  bool AnyModelField(bool (*test)(std::string_view, NameSpace&), TriState& cache) const;
   mutable std::string m_templateClassName;
   mutable TriState m_isIObjectVisitable{}, m_isPrefVisitable{};
   enum class Memo { NotComputed, BeingComputed, No, Yes };

@@ -1,5 +1,8 @@
-// The text of a class beyond its source: members, operators, record.
+// The text of a class beyond its source: members, operators, record. Each answer about what a class can do is a
+// predicate of ClassDef, so that traits, TypeOps and members agree.
 #pragma once
+
+#include <string>
 
 #include "translator/class_def.h"
 
@@ -8,7 +11,12 @@ namespace qrex {
 void WriteClassMembers(TextWriter& out, const ClassDef& def);    // in-class text, at the closing brace
 void WriteClassOperators(TextWriter& out, const ClassDef& def);  // at name-space scope, behind the class
 void WriteEvictDgsNodes(TextWriter& out, const ClassDef& def);
+void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def);  // QueryInterface, GetReflectedClass out of line
+void WriteGetReflected(TextWriter& out, const ClassDef& def);
 void WriteGetTypeOps(TextWriter& out, const ClassDef& def);
-void WriteGetReflectedClassRecord(TextWriter& out, const ClassDef& def);  // the definition of _GetReflected
+
+void WriteTemplatePrefix(TextWriter& out, const ClassDef& def);  // with a blank behind it, or nothing
+std::string QualifiedTemplateName(const ClassDef& def);          // a::N, or a::N<argument names>
+bool HasCreateFunction(const ClassDef& def);
 
 }  // namespace qrex

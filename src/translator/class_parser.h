@@ -16,6 +16,7 @@ void ParseClass(QrexParser& parser, ClassKind kind, ClassDef* enclosing);  // `e
 // --- Shared with the other kinds that live in classes
 void ParseClassBody(QrexParser& parser, ClassDef& def);  // on `{`; leaves it on the matching `}`
 void ParseFieldOrMethod(QrexParser& parser, ClassDef& def);
+void ParseThis(QrexParser& parser, ClassDef& def);           // stands behind the word afterwards
 bool ParseQualifierList(QrexParser& parser, ClassDef& def);  // behind `<<`; true when some entry needs reflection
 void WriteForwardDeclaration(TextWriter& out, const ClassDef& def);
 void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def);

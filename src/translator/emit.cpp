@@ -62,6 +62,12 @@ void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& argum
   });
 }
 
+void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, const FunctionSignature& method) {
+  out << className << (method.isConst ? " const" : "") << "* _self";
+  if (!method.arguments.empty()) out << ",";
+  WriteArgDeclarations(out, method.arguments);
+}
+
 void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments) {
   WriteList(out, arguments, [&](const FunctionArg& argument) { PrintType(out, argument.type); });
 }
@@ -72,6 +78,18 @@ void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments) {
 
 void WriteReturn(TextWriter& out, const TypeCode& returnType) {
   if (!IsVoid(returnType)) out << "return ";
+}
+
+void WriteNameOrZero(TextWriter& out, bool present, std::string_view name) {
+  out << (present ? name : std::string_view("0")) << ",";
+}
+
+void WriteCountedName(TextWriter& out, size_t count, std::string_view name) {
+  if (count == 0) {
+    out << "0,0,";
+  } else {
+    out << name << "," << count << ",";
+  }
 }
 
 void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments) {

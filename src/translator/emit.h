@@ -45,8 +45,14 @@ inline char BitText(bool value) { return value ? '1' : '0'; }
 // Argument lists, all without their parentheses.
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "T a,U b"
 void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments);         // "T,U"
-void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);         // "a,b"
-void WriteReturn(TextWriter& out, const TypeCode& returnType);                          // "return " unless void
+// "N const* _self,T a,U b": the arguments of a function that stands for a method of N.
+void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, const FunctionSignature& method);
+void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "a,b"
+void WriteReturn(TextWriter& out, const TypeCode& returnType);                   // "return " unless void
+
+// Rows of records: "NAME," or "0,"; "NAME,count," or "0,0,".
+void WriteNameOrZero(TextWriter& out, bool present, std::string_view name);
+void WriteCountedName(TextWriter& out, size_t count, std::string_view name);
 
 // Fixed multi-line text: each `$0`..`$9` of the text is replaced by the argument of that index.
 void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments);

@@ -1,5 +1,6 @@
 #include "translator/keywords.h"
 
+#include "translator/class_parser.h"
 #include "translator/qrex_parser.h"
 #include "translator/records.h"
 
@@ -7,13 +8,40 @@ namespace qrex {
 
 namespace {
 
+template <ClassKind kind>
+void ParseFileClass(QrexParser& parser) {
+  ParseClass(parser, kind, nullptr);
+}
+
+template <ClassKind kind>
+void ParseNestedClass(QrexParser& parser, ClassDef& def) {
+  ParseClass(parser, kind, &def);
+}
+
 constexpr Keyword kKeywords[] = {
-    {"type", ParseType},       {"new", ParseNew, true},       {"warning", ParseWarning},
-    {"init", ParseInit, true}, {"uninit", ParseUninit, true},
+    {"type", ParseType},
+    {"struct", ParseFileClass<ClassKind::Struct>},
+    {"class", ParseFileClass<ClassKind::Class>},
+    {"adt", ParseFileClass<ClassKind::Adt>},
+    {"mixin", ParseFileClass<ClassKind::Mixin>},
+    {"model", ParseFileClass<ClassKind::Model>},
+    {"new", ParseNew, true},
+    {"warning", ParseWarning},
+    {"init", ParseInit, true},
+    {"uninit", ParseUninit, true},
+};
+
+constexpr ClassKeyword kClassKeywords[] = {
+    {"class", ParseNestedClass<ClassKind::Class>},
+    {"struct", ParseNestedClass<ClassKind::Struct>},
+    {"mixin", ParseNestedClass<ClassKind::Mixin>},
+    {"new", [](QrexParser& parser, ClassDef&) { ParseNew(parser); }, true},
+    {"this", ParseThis, true},
 };
 
 }  // namespace
 
 std::span<const Keyword> FileLevelKeywords() { return kKeywords; }
+std::span<const ClassKeyword> ClassLevelKeywords() { return kClassKeywords; }
 
 }  // namespace qrex

@@ -6,6 +6,7 @@
 
 namespace qrex {
 
+class ClassDef;
 class QrexParser;
 
 struct Keyword {
@@ -15,5 +16,14 @@ struct Keyword {
 };
 
 std::span<const Keyword> FileLevelKeywords();
+
+// The same inside a class body; a word that is none of these begins a field or a method.
+struct ClassKeyword {
+  std::string_view word;
+  void (*parse)(QrexParser& parser, ClassDef& def);
+  bool advancesItself = false;
+};
+
+std::span<const ClassKeyword> ClassLevelKeywords();
 
 }  // namespace qrex

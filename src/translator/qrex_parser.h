@@ -115,6 +115,7 @@ class QrexParser : public ExpressionParser {
   bool AtFileScope() const { return m_nameSpaces.size() == 1; }
   const Project& GetProject() const { return *file.file.project; }
 
+  int nesting = 0;  // of declarations inside declarations, see NestingGuard
   ScannedFile& file;
   QrexParserOutputStream& stream;
   TextWriter& out;
@@ -139,6 +140,21 @@ class QrexParser : public ExpressionParser {
   WarningFlags m_warnings;
   std::vector<WarningFlags> m_savedWarnings;
   int m_typeDepth = 0;
+};
+
+// Bounds the recursion of handlers that call each other for nested declarations, types or lists.
+class NestingGuard {
+ public:
+  explicit NestingGuard(QrexParser& parser) : m_parser(parser) {
+    if (parser.nesting >= 1000) parser.Fail("Declarations nested too deeply");
+    ++parser.nesting;
+  }
+  ~NestingGuard() { --m_parser.nesting; }
+  NestingGuard(const NestingGuard&) = delete;
+  NestingGuard& operator=(const NestingGuard&) = delete;
+
+ private:
+  QrexParser& m_parser;
 };
 
 // Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`.

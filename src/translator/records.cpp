@@ -27,14 +27,6 @@ void WriteRegistration(TextWriter& out, const NameSpaceElement& element, Registr
       << "*) 0),vesk::" << TargetIdentifier(element) << "_GetXTarget()) == vesk::NSE_OK);\n";
 }
 
-void WriteNameOrZero(TextWriter& out, bool present, std::string_view name) {
-  if (present) {
-    out << name << ",";
-  } else {
-    out << "0,";
-  }
-}
-
 void NameSpaceElement::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   if (!HaveSomethingToRegister() || !HasRecord()) return;
   WriteReflectionHead(out, *this);

@@ -18,9 +18,6 @@ class QrexParser;
 void WriteReflectionHead(TextWriter& out, const NameSpaceElement& element);  // "\n//### ..." and the target declaration
 void WriteRegistration(TextWriter& out, const NameSpaceElement& element, RegistrationLists& lists);  // if m_registered
 
-// "NAME," or "0," as rows of records have it.
-void WriteNameOrZero(TextWriter& out, bool present, std::string_view name);
-
 // --- At the place of a declaration: closes the open name spaces, writes the TypeTraits block, reopens them.
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element);
 
