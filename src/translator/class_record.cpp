@@ -82,21 +82,6 @@ void ClassRecord::WriteDepFields() {
   }
 }
 
-// Behind metadata, decorators and fixed arrays, does a map or a set stand?
-std::string_view MapOrSetIn(std::string_view code) {
-  for (;;) {
-    code = SkipMetadata(code);
-    const uint8_t op = static_cast<uint8_t>(code.empty() ? 0 : code.front());
-    if (op >= kOpVolatile && op <= kOpOffsettable) {
-      code.remove_prefix(1);
-    } else if (op == kOpArray) {
-      code = ArrayElement(code);
-    } else {
-      return op == kOpMap || op == kOpSet ? code : std::string_view();
-    }
-  }
-}
-
 void ClassRecord::WriteMapOrSetFunctions(const ModelField& field) {
   std::string_view code = MapOrSetIn(field.m_type);
   if (code.empty()) return;
