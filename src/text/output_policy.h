@@ -12,6 +12,9 @@ namespace qrex {
 // and the path. A file that cannot be written costs an "Error: " line. 1 when written, else 0.
 int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);
 
+// The text with each line feed as CR LF: how every generated file stands on disk.
+std::string WithCarriageReturns(std::string_view text);
+
 // Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time.
 bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly);
 

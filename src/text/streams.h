@@ -51,7 +51,6 @@ class PagedBuffer {
   const char* Page(size_t index) const { return m_pages[index].get(); }
   size_t Size() const { return m_size; }
   void AppendTo(std::string& text) const;
-  bool Equals(const char* data, size_t length) const;
 
  private:
   size_t m_pageSize;

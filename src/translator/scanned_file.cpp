@@ -51,12 +51,6 @@ bool IsTokenEquivalent(const std::string& path, std::string_view text) {
   }
 }
 
-std::string WithCarriageReturns(const std::string& text) {
-  std::string out;
-  ReplaceAll(text, out, "\n", "\r\n");
-  return out;
-}
-
 // The chain of imports that leads from `from` to `to`, both included; empty when there is none.
 std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const ScannedFile& to) {
   std::unordered_set<const ScannedFile*> seen{&from};

@@ -1,0 +1,68 @@
+#include "platform/console.h"
+
+#include <unistd.h>
+
+#include <cerrno>
+
+namespace qrex::platform {
+
+namespace {
+
+// Length of the well-formed sequence at the head, 0 when there is none (the Unicode Standard, table 3-7).
+size_t SequenceLength(std::string_view text) {
+  auto at = [&](size_t i) { return static_cast<unsigned char>(text[i]); };
+  const unsigned char lead = at(0);
+  if (lead < 0x80) return 1;
+  const size_t length = lead >= 0xC2 && lead <= 0xDF   ? 2
+                        : (lead & 0xF0) == 0xE0        ? 3
+                        : lead >= 0xF0 && lead <= 0xF4 ? 4
+                                                       : 0;
+  if (length == 0 || text.size() < length) return 0;
+  for (size_t i = 1; i < length; ++i) {
+    if ((at(i) & 0xC0) != 0x80) return 0;
+  }
+  const unsigned char second = at(1);
+  const bool isMalformed = (lead == 0xE0 && second < 0xA0) || (lead == 0xED && second > 0x9F) ||
+                           (lead == 0xF0 && second < 0x90) || (lead == 0xF4 && second > 0x8F);
+  return isMalformed ? 0 : length;
+}
+
+}  // namespace
+
+bool IsValidUtf8(std::string_view text) {
+  while (!text.empty()) {
+    const size_t length = SequenceLength(text);
+    if (length == 0) return false;
+    text.remove_prefix(length);
+  }
+  return true;
+}
+
+std::string WidenBytes(std::string_view text) {
+  std::string widened;
+  while (!text.empty()) {
+    size_t length = SequenceLength(text);
+    if (length == 0) {
+      const unsigned char byte = static_cast<unsigned char>(text.front());
+      widened += static_cast<char>(0xC0 | byte >> 6);
+      widened += static_cast<char>(0x80 | (byte & 0x3F));
+      length = 1;
+    } else {
+      widened += text.substr(0, length);
+    }
+    text.remove_prefix(length);
+  }
+  return widened;
+}
+
+bool StdoutIsTerminal() { return isatty(STDOUT_FILENO) != 0; }
+
+void WriteStdout(std::string_view bytes) {
+  while (!bytes.empty()) {
+    const ssize_t written = write(STDOUT_FILENO, bytes.data(), bytes.size());
+    if (written < 0 && errno != EINTR) return;
+    if (written > 0) bytes.remove_prefix(static_cast<size_t>(written));
+  }
+}
+
+}  // namespace qrex::platform

@@ -1,0 +1,169 @@
+#include "platform/file_system.h"
+
+#include <dirent.h>
+#include <fcntl.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <algorithm>
+#include <boost/filesystem.hpp>
+#include <cerrno>
+#include <cstdio>
+
+#include "platform/error.h"
+
+namespace qrex::platform {
+
+namespace {
+
+constexpr int64_t kUnixEpoch = 116444736000000000;  // 1970 on the scale of file times
+constexpr mode_t kWriteBits = S_IWUSR | S_IWGRP | S_IWOTH;
+
+int64_t FileTime(const timespec& time) { return kUnixEpoch + time.tv_sec * 10000000 + time.tv_nsec / 100; }
+
+// A descriptor that closes itself.
+class Descriptor {
+ public:
+  Descriptor(const std::string& path, int flags) : m_number(open(path.c_str(), flags | O_CLOEXEC, 0666)) {}
+  ~Descriptor() {
+    if (m_number >= 0) close(m_number);
+  }
+  Descriptor(const Descriptor&) = delete;
+  Descriptor& operator=(const Descriptor&) = delete;
+  explicit operator bool() const { return m_number >= 0; }
+  int Number() const { return m_number; }
+  bool Close() {
+    const bool closed = close(m_number) == 0;
+    m_number = -1;
+    return closed;
+  }
+
+ private:
+  int m_number;
+};
+
+bool RefuseReadOnly(const std::string& path) {
+  SetLastError(0);
+  if (!IsReadOnlyFile(path)) return false;
+  SetLastError(kErrorAccessDenied);
+  return true;
+}
+
+}  // namespace
+
+bool Stat(const std::string& path, FileInfo& info) {
+  SetLastError(0);
+  struct stat status;
+  if (stat(path.c_str(), &status) != 0) return false;
+  info.isDirectory = S_ISDIR(status.st_mode);
+  info.isReadOnly = (status.st_mode & kWriteBits) == 0;
+  info.creationTime = FileTime(status.st_ctim);
+  info.accessTime = FileTime(status.st_atim);
+  info.writeTime = FileTime(status.st_mtim);
+  info.size = static_cast<uint64_t>(status.st_size);
+  info.name = path.substr(path.rfind('/') + 1);
+  info.isHidden = !info.name.empty() && info.name.front() == '.';
+  return true;
+}
+
+bool CanRead(const std::string& path) {
+  FileInfo info;
+  return Stat(path, info) && !info.isDirectory && access(path.c_str(), R_OK) == 0;
+}
+
+bool IsReadOnlyFile(const std::string& path) {
+  FileInfo info;
+  return Stat(path, info) && !info.isDirectory && info.isReadOnly;
+}
+
+bool ReadFile(const std::string& path, std::string& content) {
+  SetLastError(0);
+  Descriptor file(path, O_RDONLY);
+  struct stat status;
+  if (!file || fstat(file.Number(), &status) != 0) return false;
+  if (S_ISDIR(status.st_mode)) {
+    errno = EISDIR;
+    return false;
+  }
+  content.clear();
+  constexpr size_t kLeast = 4096;
+  size_t size = 0;
+  for (;;) {  // the size told may be wrong, as of a pipe or a file that grows
+    content.resize(std::max({size + kLeast, static_cast<size_t>(status.st_size) + 1, content.size()}));
+    const ssize_t got = read(file.Number(), content.data() + size, content.size() - size);
+    if (got < 0 && errno == EINTR) continue;
+    if (got < 0) return false;
+    if (got == 0) break;
+    size += static_cast<size_t>(got);
+  }
+  content.resize(size);
+  return true;
+}
+
+bool WriteFile(const std::string& path, std::string_view content, bool mustBeNew) {
+  if (RefuseReadOnly(path)) return false;
+  Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC | (mustBeNew ? O_EXCL : 0));
+  if (!file) return false;
+  while (!content.empty()) {
+    const ssize_t written = write(file.Number(), content.data(), content.size());
+    if (written < 0 && errno == EINTR) continue;
+    if (written < 0) return false;
+    content.remove_prefix(static_cast<size_t>(written));
+  }
+  return file.Close();
+}
+
+bool MakeEmptyFile(const std::string& path, bool keepExisting) {
+  if (RefuseReadOnly(path)) return false;
+  return static_cast<bool>(Descriptor(path, O_WRONLY | O_CREAT | (keepExisting ? 0 : O_EXCL)));
+}
+
+bool RemoveFile(const std::string& path) {
+  if (RefuseReadOnly(path)) return false;
+  return unlink(path.c_str()) == 0;
+}
+
+bool RenameFile(const std::string& from, const std::string& to) {
+  SetLastError(0);
+  return std::rename(from.c_str(), to.c_str()) == 0;
+}
+
+bool MakeDirectory(const std::string& path) {
+  SetLastError(0);
+  return mkdir(path.c_str(), 0777) == 0;
+}
+
+bool SetReadOnlyAttribute(const std::string& path, bool readOnly) {
+  SetLastError(0);
+  struct stat status;
+  if (stat(path.c_str(), &status) != 0) return false;
+  if (((status.st_mode & kWriteBits) == 0) == readOnly) return true;
+  return chmod(path.c_str(), readOnly ? status.st_mode & ~kWriteBits : status.st_mode | S_IWUSR) == 0;
+}
+
+bool StampNow(const std::string& path) {
+  SetLastError(0);
+  return utimensat(AT_FDCWD, path.c_str(), nullptr, 0) == 0;
+}
+
+bool FullPath(const std::string& path, std::string& out) {
+  boost::system::error_code error;
+  const boost::filesystem::path full = boost::filesystem::absolute(path, error);
+  if (path.empty() || error) return false;
+  out = full.lexically_normal().generic_string();
+  if (out.size() > 1 && out.back() == '/') out.pop_back();
+  return true;
+}
+
+std::vector<std::string> EntryNames(const std::string& directory) {
+  SetLastError(0);
+  std::vector<std::string> names;
+  DIR* handle = opendir(directory.empty() ? "." : directory.c_str());
+  if (!handle) return names;
+  while (const dirent* entry = readdir(handle)) names.emplace_back(entry->d_name);
+  closedir(handle);
+  std::sort(names.begin(), names.end());
+  return names;
+}
+
+}  // namespace qrex::platform

@@ -1,0 +1,39 @@
+// Files as the system below gives them. Failures leave their code in LastError.
+//
+// The read-only attribute is "no write permission bit is set". A read-only file refuses to be opened for writing also
+// for the superuser, whom the permission bits would not stop.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+namespace qrex::platform {
+
+struct FileInfo {
+  bool isDirectory = false;
+  bool isReadOnly = false;
+  bool isHidden = false;     // the name begins with a dot
+  int64_t creationTime = 0;  // all times in 100 ns units since 1601
+  int64_t accessTime = 0;
+  int64_t writeTime = 0;
+  uint64_t size = 0;
+  std::string name;
+};
+
+bool Stat(const std::string& path, FileInfo& info);
+bool CanRead(const std::string& path);  // a file, not a directory, that opens for reading
+bool IsReadOnlyFile(const std::string& path);
+bool ReadFile(const std::string& path, std::string& content);
+bool WriteFile(const std::string& path, std::string_view content, bool mustBeNew);  // replaces what stands there
+bool MakeEmptyFile(const std::string& path, bool keepExisting);
+bool RemoveFile(const std::string& path);
+bool RenameFile(const std::string& from, const std::string& to);
+bool MakeDirectory(const std::string& path);
+bool SetReadOnlyAttribute(const std::string& path, bool readOnly);
+bool StampNow(const std::string& path);
+bool FullPath(const std::string& path, std::string& out);
+std::vector<std::string> EntryNames(const std::string& directory);  // "." and ".." included, in byte order
+
+}  // namespace qrex::platform

@@ -1,0 +1,31 @@
+// Clock, identifiers, processes.
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <functional>
+#include <string>
+
+namespace qrex::platform {
+
+int64_t SystemFileTime();         // 100 ns units since 1601
+uint64_t PerformanceCounter();    // monotonic
+uint64_t PerformanceFrequency();  // counts per second
+
+std::array<uint8_t, 16> MakeUuid();  // random, in network byte order
+
+// Runs a line through the command interpreter; its exit code. "cmd /c REST" runs REST.
+int RunCommand(const std::string& line);
+void SetEnvironment(const std::string& name, const std::string& value);
+constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
+
+uint64_t CurrentThreadId();
+struct LocalTime {
+  int day, month, year, hour, minute, second, millisecond;
+};
+LocalTime CurrentLocalTime();
+
+// Runs `body` to its end on a stack of the given size; memory is only used as the stack grows. Exceptions go on.
+void RunOnStack(size_t bytes, const std::function<void()>& body);
+
+}  // namespace qrex::platform

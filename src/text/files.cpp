@@ -1,0 +1,253 @@
+#include "text/files.h"
+
+#include <boost/crc.hpp>
+#include <cstring>
+
+#include "platform/console.h"
+#include "platform/error.h"
+#include "platform/file_system.h"
+#include "platform/system.h"
+
+namespace qrex {
+
+namespace {
+
+const std::string& Checked(const std::string& path) {
+  if (!platform::IsValidUtf8(path)) throw StringConversionException();
+  return path;
+}
+
+constexpr size_t kHeaderSize = 16;
+
+void PutLittleEndian(std::string& out, uint64_t value, size_t bytes) {
+  for (size_t i = 0; i < bytes; ++i) out += static_cast<char>(value >> (8 * i));
+}
+
+uint64_t GetLittleEndian(std::string_view bytes) {
+  uint64_t value = 0;
+  for (size_t i = bytes.size(); i-- > 0;) value = value << 8 | static_cast<unsigned char>(bytes[i]);
+  return value;
+}
+
+uint32_t Crc32(std::string_view bytes) {
+  boost::crc_32_type crc;
+  crc.process_bytes(bytes.data(), bytes.size());
+  return crc.checksum();
+}
+
+}  // namespace
+
+bool FileExists(const std::string& path) { return platform::CanRead(Checked(path)); }
+bool DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }
+
+bool CopyFile(const std::string& from, const std::string& to, bool failIfExists) {
+  std::string content;
+  platform::FileInfo info;
+  if (failIfExists && platform::Stat(Checked(to), info)) {
+    platform::SetLastError(80);
+    return false;
+  }
+  if (!platform::ReadFile(Checked(from), content)) return false;
+  try {
+    ReplaceFile(to, content);
+  } catch (const FileException& exception) {
+    platform::SetLastError(exception.errorCode);
+    return false;
+  }
+  return true;
+}
+
+bool CreateEmptyFile(const std::string& path, bool keepExisting) {
+  return platform::MakeEmptyFile(Checked(path), keepExisting);
+}
+
+void CreateDirectories(const std::string& path, bool includeLast) {
+  Checked(path);
+  platform::FileInfo info;
+  const size_t lastSlash = path.rfind('/');
+  const std::string deepest = includeLast ? path : path.substr(0, lastSlash == std::string::npos ? 0 : lastSlash);
+  if (deepest.empty() || platform::Stat(deepest, info)) return;
+  for (size_t slash = path.find('/', 1); slash != std::string::npos; slash = path.find('/', slash + 1)) {
+    platform::MakeDirectory(path.substr(0, slash));
+  }
+  if (includeLast) platform::MakeDirectory(path);
+}
+
+bool SetReadOnly(const std::string& path, bool readOnly) {
+  return platform::SetReadOnlyAttribute(Checked(path), readOnly);
+}
+
+int64_t LastWriteTime(const std::string& path) {
+  platform::FileInfo info;
+  return platform::Stat(Checked(path), info) ? info.writeTime : 0;
+}
+
+bool TouchFile(const std::string& path, bool create) {
+  platform::FileInfo info;
+  if (!platform::Stat(Checked(path), info)) return create && platform::MakeEmptyFile(path, true);
+  if (info.isReadOnly) {
+    platform::SetLastError(platform::kErrorAccessDenied);
+    return false;
+  }
+  return platform::StampNow(path);
+}
+
+bool FullPathOf(const std::string& path, std::string& out) { return platform::FullPath(Checked(path), out); }
+bool ReadWholeFile(std::string& out, const std::string& path) { return platform::ReadFile(Checked(path), out); }
+
+bool LoadText(std::string& out, const std::string& path, bool foldLineEnds) {
+  std::string text;
+  if (!ReadWholeFile(text, path)) return false;
+  if (foldLineEnds && text.find('\r') != std::string::npos) {
+    size_t to = 0;
+    for (size_t from = 0; from < text.size(); ++from) {
+      char c = text[from];
+      if (c == '\r') {
+        if (from + 1 < text.size() && text[from + 1] == '\n') ++from;
+        c = '\n';
+      }
+      text[to++] = c;
+    }
+    text.resize(to);
+  }
+  out = std::move(text);
+  return true;
+}
+
+void ReplaceFile(const std::string& path, std::string_view content) {
+  Checked(path);
+  if (platform::IsReadOnlyFile(path)) throw FileException(platform::kErrorAccessDenied, path);
+  const std::string beside = path + ".part";
+  auto fail = [&] {
+    const uint32_t code = platform::LastError();
+    platform::RemoveFile(beside);
+    throw FileException(code, path);
+  };
+  platform::RemoveFile(beside);  // a leftover of a run that was killed
+  if (!platform::WriteFile(beside, content, false)) fail();
+  if (!platform::RenameFile(beside, path)) fail();
+}
+
+bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path) {
+  std::string bytes;
+  if (!ReadWholeFile(bytes, path) || bytes.size() < kHeaderSize) return false;
+  const std::string_view header(bytes.data(), kHeaderSize);
+  if (GetLittleEndian(header.substr(0, 4)) != magic) return false;
+  const int64_t size = static_cast<int64_t>(GetLittleEndian(header.substr(8, 8)));
+  if (size < 0 || static_cast<uint64_t>(size) > bytes.size() - kHeaderSize) return false;
+  const std::string_view content(bytes.data() + kHeaderSize, static_cast<size_t>(size));
+  if (GetLittleEndian(header.substr(4, 4)) != Crc32(content)) return false;
+  payload.assign(content);
+  return true;
+}
+
+void WriteCheckedFile(uint32_t magic, std::string_view payload, const std::string& path) {
+  std::string bytes;
+  bytes.reserve(kHeaderSize + payload.size());
+  PutLittleEndian(bytes, magic, 4);
+  PutLittleEndian(bytes, Crc32(payload), 4);
+  PutLittleEndian(bytes, payload.size(), 8);
+  bytes += payload;
+  ReplaceFile(path, bytes);
+}
+
+// --- File
+
+File::File(const std::string& path, FileMode mode) {
+  if (!Open(path, mode)) throw FileException(platform::kErrorFileNotFound, path);
+}
+
+File::~File() { Close(); }
+
+bool File::Open(const std::string& path, FileMode mode) {
+  static constexpr const char* kModes[] = {"r", "w", "a", "rb", "wb", "ab"};
+  Close();
+  Checked(path);
+  m_bytesWritten = 0;
+  m_path = path;
+  m_mode = mode;
+  const bool forWriting = mode != FileMode::ReadText && mode != FileMode::ReadBinary;
+  platform::FileInfo info;
+  if (mode == FileMode::Closed || (forWriting && platform::IsReadOnlyFile(path))) return false;
+  if (platform::Stat(path, info) && info.isDirectory) return false;
+  m_stream = std::fopen(path.c_str(), kModes[static_cast<int>(mode)]);
+  return m_stream != nullptr;
+}
+
+size_t File::Read(void* buffer, size_t length) { return m_stream ? std::fread(buffer, 1, length, m_stream) : 0; }
+int64_t File::Length() { return m_bytesWritten; }
+int64_t File::Position() { return m_stream ? std::ftell(m_stream) : 0; }
+bool File::Seek(int64_t position) { return m_stream && std::fseek(m_stream, position, SEEK_SET) == 0; }
+
+void File::Write(const void* data, size_t length) {
+  if (length == 0) return;
+  if (!m_stream || std::fwrite(data, 1, length, m_stream) != length) {
+    throw FileException(platform::kErrorWriteFault, m_path);
+  }
+  m_bytesWritten += static_cast<int64_t>(length);
+}
+
+void File::Flush() {
+  if (m_stream) std::fflush(m_stream);
+}
+
+void File::Close() {
+  if (m_stream) std::fclose(m_stream);
+  m_stream = nullptr;
+}
+
+bool File::IsWritable() { return m_mode != FileMode::ReadText && m_mode != FileMode::ReadBinary; }
+
+// --- Directories
+
+namespace {
+
+class FileOrDirInfo : public IFileOrDirInfo {
+ public:
+  bool IsArchive() const override { return false; }
+  bool IsCompressed() const override { return false; }
+  bool IsDirectory() const override { return info.isDirectory; }
+  bool IsEncrypted() const override { return false; }
+  bool IsHidden() const override { return info.isHidden; }
+  bool IsOffline() const override { return false; }
+  bool IsReadOnly() const override { return info.isReadOnly; }
+  bool IsSparse() const override { return false; }
+  bool IsSystem() const override { return false; }
+  int64_t CreationTime() const override { return info.creationTime; }
+  int64_t LastAccessTime() const override { return info.accessTime; }
+  int64_t LastWriteTime() const override { return info.writeTime; }
+  uint32_t SizeLow() const override { return static_cast<uint32_t>(info.size); }
+  std::string Name() const override { return info.name; }
+
+  platform::FileInfo info;
+};
+
+}  // namespace
+
+struct FileOrDirIterator::State {
+  std::string directory;
+  std::vector<std::string> names;
+  size_t next = 0;
+  FileOrDirInfo info;
+};
+
+FileOrDirIterator::FileOrDirIterator(const std::string& pattern) : m_state(std::make_unique<State>()) {
+  const size_t slash = Checked(pattern).rfind('/');
+  m_state->directory = slash == std::string::npos ? "." : pattern.substr(0, slash);
+  m_state->names = platform::EntryNames(slash == 0 ? "/" : m_state->directory);
+}
+
+FileOrDirIterator::~FileOrDirIterator() = default;
+
+const IFileOrDirInfo* FileOrDirIterator::Next() {
+  while (m_state->next < m_state->names.size()) {
+    const std::string& name = m_state->names[m_state->next++];
+    if (!platform::Stat(m_state->directory + "/" + name, m_state->info.info)) continue;  // gone meanwhile
+    m_state->info.info.name = name;
+    m_state->info.info.isHidden = name.front() == '.';
+    return &m_state->info;
+  }
+  return nullptr;
+}
+
+}  // namespace qrex

@@ -1,0 +1,106 @@
+#include "text/paths.h"
+
+#include <algorithm>
+
+namespace qrex {
+
+namespace {
+
+char Fold(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c; }
+
+// The component at the head, with the rest moved behind its slash; false when no slash stands in the text.
+bool TakeComponent(std::string_view& path, std::string_view& component) {
+  const size_t slash = path.find('/');
+  if (slash == std::string_view::npos) return false;
+  component = path.substr(0, slash);
+  path.remove_prefix(slash + 1);
+  return true;
+}
+
+}  // namespace
+
+bool EqualIgnoringCase(std::string_view a, std::string_view b) {
+  return a.size() == b.size() &&
+         std::equal(a.begin(), a.end(), b.begin(), [](char x, char y) { return Fold(x) == Fold(y); });
+}
+
+bool StartsWithIgnoringCase(std::string_view text, std::string_view prefix) {
+  return text.size() >= prefix.size() && EqualIgnoringCase(text.substr(0, prefix.size()), prefix);
+}
+
+bool IsAbsolutePath(std::string_view path) {
+  return (!path.empty() && path[0] == '/') || (path.size() >= 4 && path[1] == ':' && path[2] == '/');
+}
+
+std::string_view FileNameOf(std::string_view path) {
+  const size_t slash = path.rfind('/');
+  return slash == std::string_view::npos ? path : path.substr(slash + 1);
+}
+
+bool StemOf(std::string_view path, std::string& stem) {
+  const std::string_view name = FileNameOf(path);
+  const size_t dot = name.rfind('.');
+  if (dot == std::string_view::npos || dot == 0) return false;
+  stem = std::string(name.substr(0, dot));
+  return true;
+}
+
+std::string NormalisePath(std::string_view path) {
+  std::string normal(path);
+  std::replace(normal.begin(), normal.end(), '\\', '/');
+  if (!normal.empty() && normal.back() == '/') normal.pop_back();
+  return normal;
+}
+
+bool HasExtension(std::string_view path, std::string_view extension) {
+  const size_t dot = path.rfind('.');
+  return dot != std::string_view::npos && EqualIgnoringCase(path.substr(dot + 1), extension);
+}
+
+bool ReplaceExtension(std::string_view path, std::string_view extension, std::string& out) {
+  const size_t dot = path.rfind('.');
+  if (dot == std::string_view::npos) return false;
+  out = std::string(path.substr(0, dot + 1)).append(extension);
+  return true;
+}
+
+std::string PathJoin(std::string_view left, std::string_view right) {
+  for (;;) {
+    if (left.empty() || left == "." || IsAbsolutePath(right)) return std::string(right);
+    if (right == ".") return std::string(left);
+    if (right.substr(0, 2) != ".." || left == "..") break;
+    right.remove_prefix(2);
+    if (!right.empty() && right.front() == '/') right.remove_prefix(1);
+    const size_t slash = left.rfind('/');
+    left = slash == std::string_view::npos ? std::string_view() : left.substr(0, slash);
+    if (right.empty()) return std::string(left);
+  }
+  return std::string(left).append("/").append(right);
+}
+
+std::string PathJoin3(std::string_view a, std::string_view b, std::string_view c) {
+  return PathJoin(PathJoin(a, b), c);
+}
+
+std::string RelativePath(std::string_view target, std::string_view base) {
+  bool matched = false;
+  for (;;) {
+    std::string_view restOfTarget = target, restOfBase = base, a, b;
+    if (!TakeComponent(restOfTarget, a) || !TakeComponent(restOfBase, b) || !EqualIgnoringCase(a, b)) break;
+    target = restOfTarget;
+    base = restOfBase;
+    matched = true;
+  }
+  std::string result;
+  if (matched && !base.empty()) {
+    for (auto count = std::count(base.begin(), base.end(), '/') + 1; count > 0; --count) result += "../";
+  }
+  result += target;
+  return result.empty() ? "." : result;
+}
+
+void ToBackslashes(TextWriter& writer, std::string_view path) {
+  for (char c : path) writer << (c == '/' ? '\\' : c);
+}
+
+}  // namespace qrex
