@@ -1,0 +1,150 @@
+#include "lex/sections.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr int kTabWidth = 4;
+
+std::string_view BracketText(int32_t open) {
+  switch (open) {
+    case kOpenParen:
+      return "(";
+    case kOpenBrace:
+      return "{";
+    default:
+      return "[";
+  }
+}
+
+bool IsBlankInLine(char c) { return c == ' ' || c == '\t' || c == '\v' || c == '\f' || c == '\r'; }
+
+void SkipBlanksInLine(LexScanner& scanner) {
+  while (!scanner.AtEnd() && IsBlankInLine(*scanner.begin)) ++scanner.begin;
+}
+
+// From inside a bracket to its closing token, which is returned.
+LexToken SkipToClose(LexScanner& scanner, int32_t open, int32_t close, const std::string& atEnd) {
+  for (int64_t depth = 1;;) {
+    const LexToken token = NextToken(scanner);
+    if (token.kind == kEndOfText) throw LexScannerException(atEnd, scanner.begin);
+    if (token.kind == open) ++depth;
+    if (token.kind == close && --depth == 0) return token;
+  }
+}
+
+TextRange RestOfLine(LexScanner& scanner, const char* begin) {
+  scanner.begin = begin;
+  while (!scanner.AtEnd() && *scanner.begin != '\n' && *scanner.begin != '\r') ++scanner.begin;
+  return {begin, scanner.begin};
+}
+
+// The last line feed of the body, and the closing bracket's own indentation, are no part of it.
+const char* EndOfAllmanBody(const char* begin, const char* close) {
+  const char* last = close - 1;
+  while (last > begin && (*last == ' ' || *last == '\t')) --last;
+  if (*last != '\n') return last + 1;
+  return last > begin && last[-1] == '\r' ? last - 1 : last;
+}
+
+}  // namespace
+
+TextRange ReadSection(LexScanner& scanner, bool openAlreadyRead, int32_t open, int32_t close) {
+  if (!openAlreadyRead) {
+    const LexToken token = NextToken(scanner);
+    if (token.kind != open) {
+      throw LexScannerException(std::string(BracketText(open)) + " expected when read " + Printed(token), token);
+    }
+  }
+  SkipWhiteSpace(scanner);
+  TextRange section(scanner.begin, scanner.begin);
+  for (int64_t depth = 1;;) {
+    const LexToken token = NextToken(scanner);
+    if (token.kind == kEndOfText) throw LexScannerException("Met EOS while reading bracketted section", scanner.begin);
+    if (token.kind == open) ++depth;
+    if (token.kind == close && --depth == 0) return section;
+    section.end = scanner.begin;
+  }
+}
+
+TextRange ReadParenSection(LexScanner& scanner, bool openAlreadyRead) {
+  return ReadSection(scanner, openAlreadyRead, kOpenParen, kCloseParen);
+}
+
+TextRange ReadBracketSection(LexScanner& scanner, bool openAlreadyRead) {
+  return ReadSection(scanner, openAlreadyRead, kOpenBracket, kCloseBracket);
+}
+
+TextRange ReadBlock(LexScanner& scanner, int32_t open, int32_t close, const char* openText, const char* closeText,
+                    bool required, int& indent) {
+  indent = 0;
+  SkipBlanksInLine(scanner);
+  if (scanner.AtEnd()) {
+    throw LexScannerException("Expected " + std::string(openText) + " when read EOS", scanner.begin);
+  }
+  const bool onThisLine = *scanner.begin != '\n';
+  const LexToken first = NextToken(scanner);
+  if (first.kind != open) {
+    if (onThisLine && !required) return RestOfLine(scanner, first.text.begin);
+    throw LexScannerException("Expected " + std::string(openText) + " when read " + Printed(first), first);
+  }
+  const std::string atEnd = "Met EOS before closing " + std::string(closeText);
+  if (onThisLine) {
+    if (scanner.AtEnd()) throw LexScannerException(atEnd, scanner.begin);
+    if (!scanner.AtEnd() && *scanner.begin == '\r') ++scanner.begin;
+    if (!scanner.AtEnd() && *scanner.begin == '\n') ++scanner.begin;
+    const char* begin = scanner.begin;
+    return {begin, SkipToClose(scanner, open, close, "Met EOS while reading bracketted string").text.begin};
+  }
+  SkipBlanksInLine(scanner);
+  if (!scanner.AtEnd() && *scanner.begin == '\n') ++scanner.begin;
+  for (; !scanner.AtEnd() && (*scanner.begin == ' ' || *scanner.begin == '\t'); ++scanner.begin) {
+    indent += *scanner.begin == '\t' ? kTabWidth : 1;
+  }
+  const char* begin = scanner.begin;
+  const LexToken closing = SkipToClose(scanner, open, close, atEnd);
+  return {begin, EndOfAllmanBody(first.text.end, closing.text.begin)};
+}
+
+TextRange ReadBraceBlock(LexScanner& scanner, int& indent) {
+  return ReadBlock(scanner, kOpenBrace, kCloseBrace, "{", "}", false, indent);
+}
+
+TextRange ReadParenBlock(LexScanner& scanner, int& indent) {
+  return ReadBlock(scanner, kOpenParen, kCloseParen, "(", ")", true, indent);
+}
+
+LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close) {
+  SkipWhiteSpace(scanner);
+  const char* const begin = scanner.begin;
+  auto failAtEnd = [&] {
+    throw LexScannerException("Met EOS while reading argument " + std::string(begin, scanner.end), scanner.end);
+  };
+  if (!scanner.AtEnd() && *scanner.begin == '`') {
+    const size_t length = std::string_view(begin + 1, static_cast<size_t>(scanner.end - begin) - 1).find('`');
+    if (length == std::string_view::npos) failAtEnd();
+    argument = TextRange(begin + 1, begin + 1 + length);
+    scanner.begin = argument.end + 1;
+    return NextToken(scanner);
+  }
+  argument = TextRange(begin, begin);
+  int32_t nest = kNoToken;  // the opening bracket of the nest at hand
+  for (int64_t depth = 0;;) {
+    argument.end = scanner.begin;
+    const LexToken token = NextToken(scanner);
+    if (token.kind == kEndOfText) failAtEnd();
+    if (depth == 0) {
+      if (token.kind == kComma || token.kind == close) return token;
+      if (token.kind == kOpenParen || token.kind == kOpenBrace || token.kind == kOpenBracket) {
+        nest = token.kind;
+        depth = 1;
+      }
+    } else if (token.kind == nest) {
+      ++depth;
+    } else if (token.kind == nest + 1) {
+      --depth;
+    }
+  }
+}
+
+}  // namespace qrex
