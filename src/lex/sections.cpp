@@ -83,9 +83,10 @@ TextRange ReadBlock(LexScanner& scanner, int32_t open, int32_t close, const char
     throw LexScannerException("Expected " + std::string(openText) + " when read EOS", scanner.begin);
   }
   const bool onThisLine = *scanner.begin != '\n';
+  const char* const lineRest = scanner.begin;
   const LexToken first = NextToken(scanner);
   if (first.kind != open) {
-    if (onThisLine && !required) return RestOfLine(scanner, first.text.begin);
+    if (onThisLine && !required) return RestOfLine(scanner, lineRest);
     throw LexScannerException("Expected " + std::string(openText) + " when read " + Printed(first), first);
   }
   const std::string atEnd = "Met EOS before closing " + std::string(closeText);

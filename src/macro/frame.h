@@ -10,6 +10,7 @@
 #include <vector>
 
 #include "lex/token.h"
+#include "text/index_set.h"
 #include "text/text_writer.h"
 
 namespace qrex {
@@ -26,6 +27,8 @@ class LSVariable {
   virtual VarType Kind() const = 0;
   virtual void WriteDefinition(TextWriter& writer) const = 0;
   virtual void WriteValue(TextWriter& writer) const = 0;
+  virtual std::string ValueText() const = 0;
+  virtual std::unique_ptr<LSVariable> Clone() const = 0;
 
   TextRange name;
 };
@@ -41,17 +44,22 @@ class LSMacroVariable : public LSVariable {
   VarType Kind() const override { return VarType::Macro; }
   void WriteDefinition(TextWriter& writer) const override;
   void WriteValue(TextWriter& writer) const override;
+  std::string ValueText() const override { return body.Text(); }
+  std::unique_ptr<LSVariable> Clone() const override;
   std::string Signature() const;
+  // Makes name, formals and body refer to a copy of `text`, in which they lie now.
+  void OwnText(const TextRange& text);
 
   bool isPython = false;
   bool isNaked = false;
   bool isFunctionArgument = false;
+  bool isTemporary = false;  // the body was composed on the way: it is no source text
   VarType resultType = VarType::Macro;
   std::vector<MacroFormal> formals;
   LSFrame* homeFrame = nullptr;
   int stripIndent = 0;
   TextRange body;
-  std::string ownedText;  // optional owned copy that `body` (and `name`) may refer to
+  std::shared_ptr<const std::string> ownedText;
 };
 
 class LSValueVariable : public LSVariable {
@@ -60,18 +68,23 @@ class LSValueVariable : public LSVariable {
   VarType Kind() const override { return type; }
   void WriteDefinition(TextWriter& writer) const override;
   void WriteValue(TextWriter& writer) const override;
+  std::string ValueText() const override { return value; }
+  std::unique_ptr<LSVariable> Clone() const override;
 
   VarType type;
   std::string value;  // canonical text
 };
 
-// A string variable that owns the text of its name.
+// A value variable that owns the text of its name.
 class LSVar : public LSValueVariable {
  public:
-  LSVar(std::string name, std::string value);
-  std::string ownName;
+  LSVar(std::string name, std::string value) : LSVar(std::move(name), VarType::String, std::move(value)) {}
+  LSVar(std::string name, VarType type, std::string value);
+  std::unique_ptr<LSVariable> Clone() const override;
+  const std::string ownName;
 };
 
+// A scope of names. Child frames come and go with every body and expression, so one without definitions owns nothing.
 class LSFrame {
  public:
   explicit LSFrame(LSFrame* parent);
@@ -82,21 +95,25 @@ class LSFrame {
   void AddVariable(std::unique_ptr<LSVariable> variable);  // the newest of a name takes over the entry
   LSVariable* FindLocal(std::string_view name) const;
   LSVariable* FindInChain(std::string_view name) const;
-  LSVariable* FindInFrame(std::string_view name, const char* position) const;  // with its imports
-  LSVariable* Find(std::string_view name, const char* position) const;         // FindInFrame up the chain
+  virtual LSVariable* FindInFrame(std::string_view name, const char* position) const;  // with its imports
+  LSVariable* Find(std::string_view name, const char* position) const;                 // FindInFrame up the chain
   void WriteFrame(TextWriter& writer) const;
 
   LSFrame* Parent() const { return m_parent; }
   LSFileFrame* FileFrame() const { return m_fileFrame; }
 
  protected:
-  friend class LSFileFrame;
-  struct Names;  // the implementation's own: variables, names, import index
-  std::unique_ptr<Names> m_names;
+  virtual void OnAdded(LSVariable&) {}
+
+  std::vector<std::unique_ptr<LSVariable>> m_variables;            // oldest first
+  std::unordered_map<std::string_view, LSVariable*> m_names;       // the newest of each name
   LSFrame* m_parent;
   LSFileFrame* m_fileFrame;
 };
 
+// The frame of a file. Every identifier of every text is looked up through all imports, so this must not cost time that
+// grows with their number: one table lists the definitions of each name in all file frames, and each frame keeps the set of
+// the frames that it sees. A name that stands nowhere is answered by one probe.
 class LSFileFrame : public LSFrame {
  public:
   explicit LSFileFrame(LSFrame* parent = nullptr);
@@ -104,14 +121,24 @@ class LSFileFrame : public LSFrame {
 
   void AddImport(LSFileFrame& imported);
   void AddOrderedImport(LSFileFrame& imported);  // the same, and its substitutions are searched
+  LSVariable* FindInFrame(std::string_view name, const char* position) const override;
   void DefineSubstitution(const std::string& name, const std::string& value);  // also the macro _name_
   const std::string* FindSubstitution(std::string_view name) const;
   bool Substitute(std::string& text) const;  // expands $(name) in place, repeatedly; true if anything changed
-  void CopyFrom(const LSFileFrame& other);   // starts as a copy of another frame's definitions and substitutions
+  void CopyFrom(const LSFileFrame& other);   // the definitions and substitutions of another frame
+
+ protected:
+  void OnAdded(LSVariable& variable) override;
 
  private:
-  struct FileNames;
-  std::unique_ptr<FileNames> m_file;
+  class NearestDefinition;
+  bool SubstituteOnce(std::string& text) const;
+
+  const size_t m_index;
+  IndexSet m_allImports;
+  std::vector<LSFileFrame*> m_directImports;
+  std::vector<LSFileFrame*> m_orderedImports;
+  std::map<std::string, std::string, std::less<>> m_substitutions;
 };
 
 }  // namespace qrex

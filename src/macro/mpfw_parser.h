@@ -24,6 +24,10 @@ struct MpfwSourceFile {
 
 struct MpfwContext {
   explicit MpfwContext(SourceFileList& sourceFiles) : sourceFiles(sourceFiles) {}
+  // The frame starts as a copy of the parent's, which it also has as its parent.
+  explicit MpfwContext(MpfwContext& parent) : sourceFiles(parent.sourceFiles), rootFrame(&parent.rootFrame) {
+    rootFrame.CopyFrom(parent.rootFrame);
+  }
   SourceFileList& sourceFiles;
   LSFileFrame rootFrame;
   std::vector<std::string> importPaths;
@@ -51,10 +55,19 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   bool ParseImportStatement();
   bool ParseVariableStatement(std::string* name = nullptr, std::string* value = nullptr);
 
+  // Expands the text of a file that stands in the context already; false after an error, which is reported.
+  bool ExpandSourceFile(MpfwSourceFile& file);
+
  protected:
-  // Runs `loop` (a derived parser over the file's expansion) and reports as an import does: the inner error is written,
-  // and "while processing @import of " is raised at the @import.
+  // The common part of OnImportedFile: runs `parse` with a parser of its own over the file's expansion. An error is written,
+  // and "while processing @import of " is raised at the @import; so is what stands behind the last statement.
+  void ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*parse)(MpfwParser& parser));
+
   MpfwContext& context;
+
+ private:
+  static constexpr int kMaxImportDepth = 200;  // a file may import itself
+  int m_importDepth = 0;
 };
 
 }  // namespace qrex

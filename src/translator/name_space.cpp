@@ -25,20 +25,6 @@ std::string PrintedElement(const NameSpaceElement& element) {
   return text.TakeText();
 }
 
-void FileSet::Add(size_t index) {
-  if (m_words.size() <= index / 64) m_words.resize(index / 64 + 1);
-  m_words[index / 64] |= uint64_t{1} << (index % 64);
-}
-
-void FileSet::Add(const FileSet& other) {
-  if (m_words.size() < other.m_words.size()) m_words.resize(other.m_words.size());
-  for (size_t i = 0; i < other.m_words.size(); ++i) m_words[i] |= other.m_words[i];
-}
-
-bool FileSet::Has(size_t index) const {
-  return index / 64 < m_words.size() && (m_words[index / 64] >> (index % 64) & 1) != 0;
-}
-
 void SymbolIndex::Enter(const std::string& qualifiedName, NameSpaceElement& element) {
   m_elements[qualifiedName].push_back(&element);
 }

@@ -72,17 +72,6 @@ class NameSpaceElement {
   mutable std::string m_qualifiedName;
 };
 
-// A set of files by their index in the build.
-class FileSet {
- public:
-  void Add(size_t index);
-  void Add(const FileSet& other);
-  bool Has(size_t index) const;
-
- private:
-  std::vector<uint64_t> m_words;
-};
-
 // Every declaration of the build by qualified name. Kept by NameSpace::Add and the destructor of NameSpace.
 class SymbolIndex {
  public:

@@ -16,9 +16,10 @@ void Define(ScannedFile& file, std::string_view name, std::string value) {
 // `@macroNAME` stands for nothing: it exists, so that `@if` can tell a defined macro from one that is not.
 void DefineMacroMark(ScannedFile& file, const std::string& piece) {
   auto mark = std::make_unique<LSMacroVariable>();
-  mark->ownedText = "@macro" + piece;
-  mark->name = TextRange(std::string_view(mark->ownedText));
+  const std::string name = "@macro" + piece;
+  mark->name = TextRange(std::string_view(name));
   mark->body = TextRange(mark->name.end, mark->name.end);
+  mark->OwnText(mark->name);
   file.frame.AddVariable(std::move(mark));
 }
 

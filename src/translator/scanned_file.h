@@ -8,6 +8,7 @@
 
 #include "macro/expand.h"
 #include "macro/frame.h"
+#include "text/index_set.h"
 #include "translator/name_space.h"
 #include "workspace/project_model.h"
 
@@ -80,8 +81,8 @@ class ScannedFile : public ImportHandler {
   int64_t translationTime = 0;  // when the output was last brought up to date
   bool translated = false;
   bool hasDeclarations = false;
-  const size_t index;           // in the build, for FileSet
-  FileSet mounted;              // the files whose declarations are visible here, this one excluded
+  const size_t index;           // in the build, for IndexSet
+  IndexSet mounted;             // the files whose declarations are visible here, this one excluded
   bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
   LSFileFrame frame;
   std::unique_ptr<NameSpace> rootNameSpace;

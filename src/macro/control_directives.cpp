@@ -1,0 +1,201 @@
+// @if, @while, @for, @scope, @else, @runpython.
+
+#include "lex/sections.h"
+#include "macro/expansion_context.h"
+#include "macro/python_bridge.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr int64_t kMaxIterations = 1000000;
+
+// On a copy of the scanner: `@` and the word, with comments and line ends between at will.
+bool Probe(LexScanner& scanner, std::string_view word) {
+  LexScanner ahead = scanner;
+  if (NextToken(ahead).kind != kAt) return false;
+  const LexToken token = NextToken(ahead);
+  if (token.kind != kIdentifier || !(token.text == word)) return false;
+  scanner = ahead;
+  return true;
+}
+
+// Reads a block; a failure gets the directive's context line.
+TextRange ReadBlockOf(LexScanner& scanner, std::string_view directive, int& indent) {
+  try {
+    return ReadBraceBlock(scanner, indent);
+  } catch (LexScannerException& exception) {
+    exception.message.append("\n    for ").append(directive).append(" directive");
+    throw;
+  }
+}
+
+}  // namespace
+
+// All conditions are evaluated, also behind the branch that is taken, and so can fail.
+void ExpansionContext::If() {
+  TextRange selected;
+  int selectedIndent = 0;
+  bool found = false;
+  auto readBranch = [&](std::string_view name) {
+    const bool holds = EvaluateCondition(ReadParenSection(m_scanner, false), name);
+    int indent;
+    const TextRange block = ReadBraceBlock(m_scanner, indent);
+    if (!holds || found) return;
+    found = true;
+    selected = block;
+    selectedIndent = indent;
+  };
+  readBranch("@if");
+  while (Probe(m_scanner, "elseif")) readBranch("@elseif");
+  if (Probe(m_scanner, "else")) {
+    int indent;
+    const TextRange block = ReadBraceBlock(m_scanner, indent);
+    if (!found) {
+      selected = block;
+      selectedIndent = indent;
+    }
+  }
+  DropToScanner();
+  LSFrame child(&m_frame);
+  ExpandBlock(selected, child, selectedIndent, CurrentColumn());
+}
+
+void ExpansionContext::Else() { throw LexScannerException("@else with no matching @if directive", m_tokenText); }
+
+void ExpansionContext::While() {
+  const TextRange condition = ReadParenSection(m_scanner, false);
+  int indent;
+  const TextRange block = ReadBlockOf(m_scanner, "@while", indent);
+  DropToScanner();
+  const int64_t column = CurrentColumn();
+  for (int64_t i = 0; EvaluateCondition(condition, "@while"); ++i) {
+    if (i == kMaxIterations) throw LexScannerException("Too many iterations in @while directive", m_tokenText);
+    LSFrame child(&m_frame);
+    ExpandBlock(block, child, indent, column);
+  }
+}
+
+void ExpansionContext::Scope() {
+  int indent;
+  const TextRange block = ReadBraceBlock(m_scanner, indent);
+  DropToScanner();
+  LSFrame child(&m_frame);
+  ExpandBlock(block, child, indent, CurrentColumn());
+}
+
+void ExpansionContext::RunPython() {
+  throw LexScannerException("@runpython: Python initialisation error: no interpreter is built in", m_tokenText);
+}
+
+// --- @for
+
+struct ExpansionContext::Loop {
+  bool isTuple = false;
+  std::vector<TextRange> variables;
+  TextRange list;
+  std::string elements;  // the list, expanded
+  TextRange block;
+  int indent = 0;
+  int64_t column = 0;
+};
+
+ExpansionContext::Loop ExpansionContext::ReadLoopHead() {
+  Loop loop;
+  const LexToken open = Next();
+  if (open.kind != kOpenParen) FailAt(open, WithToken("( expected after @for when read ", open));
+  LexToken token = Next();
+  loop.isTuple = token.kind == kOpenParen;
+  if (!loop.isTuple) {
+    if (token.kind != kIdentifier) FailAt(token, WithToken("Identifier expected after @for( when read ", token));
+    loop.variables.push_back(token.text);
+  } else {
+    do {
+      loop.variables.push_back(RequireIdentifier("Identifier expected when read ").text);
+      token = Next();
+      if (token.kind != kComma && token.kind != kCloseParen) FailAt(token, WithToken(", or ) expected when read ", token));
+    } while (token.kind == kComma);
+  }
+  token = Next();
+  if (token.kind != kIdentifier || !token.Is("in")) FailAt(token, WithToken("'in' expected when read ", token));
+  loop.list = ReadParenSection(m_scanner, true);
+  loop.elements = ExpandPart(loop.list);
+  loop.block = ReadBlockOf(m_scanner, "@for", loop.indent);
+  return loop;
+}
+
+void ExpansionContext::For() {
+  Loop loop = ReadLoopHead();
+  DropToScanner();
+  loop.column = CurrentColumn();
+  try {
+    RunLoop(loop);
+  } catch (LexScannerException& exception) {
+    ForgetPosition(exception, loop.elements);
+    throw;
+  }
+}
+
+void ExpansionContext::RunLoop(const Loop& loop) {
+  LexScanner scanner{std::string_view(loop.elements)};
+  const LexToken open = NextToken(scanner);
+  if (open.kind != kOpenBracket) {
+    throw LexScannerException(WithToken("[ expected when read read ", open), loop.list);
+  }
+  for (;;) {
+    TextRange element;
+    LexToken end;
+    try {
+      end = ReadArgument(scanner, element, kCloseBracket);
+    } catch (LexScannerException& exception) {
+      exception.position = loop.list.begin;
+      exception.message += "\n    in @for directive for list " + loop.elements;
+      throw;
+    }
+    if (end.kind == kComma || !element.Empty()) {
+      LSFrame frame(&m_frame);
+      try {
+        BindElement(loop, element, frame);
+      } catch (LexScannerException& exception) {
+        exception.position = loop.list.begin;
+        throw;
+      }
+      try {
+        ExpandBlock(loop.block, frame, loop.indent, loop.column);
+      } catch (LexScannerException& exception) {
+        exception.message += "\n    in @for directive when " + (loop.isTuple ? "" : loop.variables[0].Text()) + " = " +
+                             element.Text();
+        throw;
+      }
+    }
+    if (end.kind == kCloseBracket) return;
+    if (end.kind != kComma) throw LexScannerException(WithToken(", or ] expected when read ", end), loop.list);
+  }
+}
+
+// An element is text, not a value: it is expanded wherever the variable is used, in the frame of the @for.
+void ExpansionContext::BindElement(const Loop& loop, const TextRange& element, LSFrame& frame) {
+  auto bind = [&](const TextRange& name, const TextRange& text) {
+    auto variable = std::make_unique<LSMacroVariable>();
+    variable->name = name;
+    variable->body = text;
+    variable->homeFrame = &m_frame;
+    variable->isTemporary = true;
+    frame.AddVariable(std::move(variable));
+  };
+  if (!loop.isTuple) return bind(loop.variables[0], element);
+  LexScanner scanner(element);
+  const LexToken open = NextToken(scanner);
+  if (open.kind != kOpenParen) throw LexScannerException(WithToken("( expected when read ", open), loop.list);
+  for (size_t i = 0; i < loop.variables.size(); ++i) {
+    TextRange text;
+    const LexToken end = ReadArgument(scanner, text, kCloseParen);
+    const bool isLast = i + 1 == loop.variables.size();
+    if (end.kind != (isLast ? kCloseParen : kComma)) {
+      throw LexScannerException(WithToken(isLast ? ") expected when read " : ", expected when read ", end), loop.list);
+    }
+    bind(loop.variables[i], text);
+  }
+}
+
+}  // namespace qrex

@@ -1,0 +1,27 @@
+// The words behind `@`, and how each treats the line that it stands on.
+#pragma once
+
+#include <string_view>
+
+#include "macro/expansion_context.h"
+
+namespace qrex {
+
+struct Directive {
+  enum class Line {
+    Kept,          // what stands ahead of it on its line goes out first: its output comes at that column
+    Dropped,       // the blanks ahead of it are dropped
+    DroppedWhole,  // as well as the rest of its line: it leaves no trace
+    OfItsOwn,
+  };
+  std::string_view word;
+  Line line;
+  void (ExpansionContext::*run)();
+  void Run(ExpansionContext& context) const { (context.*run)(); }
+
+  static const Directive* Find(std::string_view word);
+};
+
+inline const Directive* FindDirective(std::string_view word) { return Directive::Find(word); }
+
+}  // namespace qrex

@@ -1,0 +1,269 @@
+#include "macro/expand.h"
+
+#include "lex/literals.h"
+#include "macro/directives.h"
+#include "macro/expansion_context.h"
+#include "text/numbers.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr int kMaxNesting = 1000;
+constexpr int kTabWidth = 4;
+int nesting = 0;
+
+}  // namespace
+
+bool ImportHandler::ImportPath(const std::string&, const char*) { return false; }
+
+std::string WithToken(std::string_view message, const LexToken& token) { return std::string(message) + Printed(token); }
+
+void ForgetPosition(LexScannerException& exception, const std::string& text) {
+  if (TextRange(std::string_view(text)).Contains(exception.position)) exception.position = nullptr;
+}
+
+ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                                   int64_t outIndent, ExpansionSink& sink, const TextRange* anchor)
+    : m_handler(handler),
+      m_frame(frame),
+      m_sink(sink),
+      m_stripIndent(stripIndent),
+      m_outIndent(outIndent),
+      m_text(text),
+      m_anchor(anchor),
+      m_scanner(text),
+      m_tokenText(text.begin, text.begin),
+      m_pendingBegin(text.begin),
+      m_settled(text.begin) {
+  if (nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
+  ++nesting;
+}
+
+ExpansionContext::~ExpansionContext() { --nesting; }
+
+void ExpansionContext::Run() {
+  for (;;) {
+    SkipToToken();
+    const LexToken token = NextToken(m_scanner, true);
+    m_tokenText = token.text;
+    switch (token.kind) {
+      case kEndOfText: return FlushTo(m_scanner.begin);
+      case kIdentifier: ExpandIdentifier(token); break;
+      case kDoubleQuoted: SubstituteInString(token); break;
+      case kMacroComment:
+        Settle();
+        SwallowLine();
+        break;
+      case kAt: ExpandAt(); break;
+      default: break;
+    }
+    m_settled = m_scanner.begin;
+  }
+}
+
+// To the begin of the next token, which `m_here` keeps. Every line but the first loses up to `m_stripIndent` columns.
+void ExpansionContext::SkipToToken() {
+  for (; !m_scanner.AtEnd(); ++m_scanner.begin) {
+    const char c = *m_scanner.begin;
+    if (c == ' ' || c == '\t') continue;
+    if (c != '\n') break;
+    m_settled = m_scanner.begin + 1;
+    if (m_stripIndent > 0) {
+      ++m_scanner.begin;
+      Settle();
+      StripIndentation(m_stripIndent);
+      DropToScanner();
+      --m_scanner.begin;
+    }
+  }
+  m_here = m_scanner.begin;
+}
+
+void ExpansionContext::ExpandIdentifier(const LexToken& token) {
+  LSVariable* variable = m_frame.Find(token.text.View(), token.text.begin);
+  if (!variable) return;
+  FlushTo(m_here);
+  CallVariable(*variable);
+}
+
+void ExpansionContext::SubstituteInString(const LexToken& token) {
+  const LSFileFrame* fileFrame = m_frame.FileFrame();
+  if (!fileFrame || token.text.View().find("$(") == std::string_view::npos) return;
+  std::string text = token.text.Text();
+  try {
+    if (!fileFrame->Substitute(text)) return;
+  } catch (LexScannerException& exception) {
+    exception.position = token.text.begin;
+    throw;
+  }
+  FlushTo(m_here);
+  EmitGenerated(text);
+  DropToScanner();
+}
+
+void ExpansionContext::ExpandAt() {
+  const LexToken token = Next();
+  switch (token.kind) {
+    case kAt:
+      FlushTo(m_here);
+      return DropToScanner();
+    case kOpenBracket: FlushTo(m_here); return DoubleExpansion();
+    case kOpenParen: FlushTo(m_here); return ParenExpression();
+    case kDollar:
+      if (m_handler) DefineSubstitution();
+      return;
+    case kIdentifier: break;
+    default: return;
+  }
+  const Directive* directive = FindDirective(token.text.View());
+  if (!directive) {
+    ExpandPredefined(token);
+    return;
+  }
+  if (directive->line == Directive::Line::Kept) {
+    FlushTo(m_here);
+  } else if (directive->line != Directive::Line::OfItsOwn) {
+    Settle();
+    DropTo(m_here);
+  }
+  directive->Run(*this);
+  if (directive->line == Directive::Line::DroppedWhole) SwallowLine();
+}
+
+bool ExpansionContext::ExpandPredefined(const LexToken& name) {
+  thread_local std::string key;
+  key.assign("@").append(name.text.View());
+  const LSVariable* variable = m_frame.FindInChain(key);
+  if (!variable) return false;
+  FlushTo(m_here);
+  EmitGenerated(variable->ValueText());
+  DropToScanner();
+  return true;
+}
+
+// --- Output
+
+void ExpansionContext::FlushTo(const char* position) {
+  if (m_pendingBegin < position) {
+    const TextRange text(m_pendingBegin, position);
+    if (m_anchor) {
+      m_sink.WriteGenerated(text.View(), *m_anchor, m_outIndent);
+    } else {
+      m_sink.WriteVerbatim(text, m_outIndent);
+    }
+  }
+  m_pendingBegin = position;
+}
+
+void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
+
+void ExpansionContext::EmitGenerated(std::string_view text) { m_sink.WriteGenerated(text, *AnchorForTemporary(), m_outIndent); }
+
+void ExpansionContext::StripIndentation(int64_t width) {
+  for (int64_t column = 0; column < width && !m_scanner.AtEnd(); ++m_scanner.begin) {
+    if (*m_scanner.begin == ' ') ++column;
+    else if (*m_scanner.begin == '\t') column += kTabWidth;
+    else return;
+  }
+}
+
+void ExpansionContext::SwallowLine() {
+  const char* behindLine = nullptr;
+  for (; !m_scanner.AtEnd(); ++m_scanner.begin) {
+    const char c = *m_scanner.begin;
+    if (c == '\n') behindLine = m_scanner.begin + 1;
+    else if (c != ' ' && c != '\t') break;
+  }
+  if (behindLine) m_scanner.begin = behindLine;
+  StripIndentation(m_stripIndent);
+  DropToScanner();
+}
+
+// --- Expansion of parts
+
+void ExpansionContext::ExpandBlock(const TextRange& block, LSFrame& frame, int indent, int64_t column) {
+  if (block.Empty()) return;
+  ExpansionContext(nullptr, frame, block, indent, column, m_sink, m_anchor).Run();
+}
+
+std::string ExpansionContext::ExpandPart(const TextRange& part, int64_t stripIndent) {
+  LSFrame child(&m_frame);
+  return ExpandAside(child, part, stripIndent, m_anchor);
+}
+
+std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor) {
+  if (text.Empty()) return {};
+  ExpansionSink sink;
+  ExpansionContext(nullptr, frame, text, stripIndent, 0, sink, anchor).Run();
+  return std::move(sink.output);
+}
+
+LexToken ExpansionContext::RequireIdentifier(std::string_view message) {
+  const LexToken token = Next();
+  if (token.kind != kIdentifier) FailAt(token, WithToken(message, token));
+  return token;
+}
+
+void ExpansionContext::FailAt(const LexToken& token, std::string message) const {
+  throw LexScannerException(std::move(message), token);
+}
+
+// --- Entries
+
+void Expand(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent, int64_t outIndent,
+            ExpansionSink& sink) {
+  ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).Run();
+}
+
+std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                           int64_t outIndent) {
+  SourceMap map;
+  return ExpandToStringWithMap(handler, frame, text, stripIndent, outIndent, map);
+}
+
+std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                                  int64_t outIndent, SourceMap& map) {
+  ExpansionSink sink;
+  sink.output.reserve(text.Size());
+  ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).Run();
+  map = std::move(sink.map);
+  return std::move(sink.output);
+}
+
+namespace {
+
+std::string ReadCanonical(ExpressionParser& parser, VarType type) {
+  switch (type) {
+    case VarType::Bool: return parser.ReadBool() ? "true" : "false";
+    case VarType::Int: return std::to_string(parser.ReadInt32());
+    case VarType::Double: return ToString(parser.ReadFloat64());
+    case VarType::Char: {
+      std::string text;
+      WriteCharLiteral(text, static_cast<char>(parser.ReadChar()));
+      return text;
+    }
+    default: return parser.ReadStringValue();
+  }
+}
+
+}  // namespace
+
+std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type) {
+  LSFrame child(&frame);
+  const std::string expansion = ExpandAside(child, text, 0, nullptr);
+  try {
+    ExpressionParser parser;
+    parser.SetInput(TextRange(std::string_view(expansion)));
+    std::string value = ReadCanonical(parser, type);
+    if (parser.current.kind != kEndOfText) {
+      throw LexScannerException("Read " + Printed(parser.current) + " in middle of expression", parser.current);
+    }
+    return value;
+  } catch (LexScannerException& exception) {
+    ForgetPosition(exception, expansion);
+    throw;
+  }
+}
+
+}  // namespace qrex

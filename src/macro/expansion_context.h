@@ -1,0 +1,141 @@
+// The state of one run of the expansion loop over one text, shared by the loop (expand.cpp), the directives
+// (directives.cpp, control_directives.cpp, definitions.cpp) and the macro call (macro_call.cpp).
+//
+// Source text that passes through is not copied token by token: what lies between `m_pendingBegin` and `m_settled` is due
+// for the output and goes there in one run, when something other is to be written or dropped.
+#pragma once
+
+#include <memory>
+#include <string>
+
+#include "lex/scanner.h"
+#include "macro/expand.h"
+#include "macro/expression_parser.h"
+
+namespace qrex {
+
+class ExpansionContext {
+ public:
+  // `anchor`: for a text composed on the way, the source that stands for it in the map (it may end before the map and
+  // before a macro that it defines). Null for source text.
+  ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                   int64_t outIndent, ExpansionSink& sink, const TextRange* anchor);
+  ~ExpansionContext();
+  ExpansionContext(const ExpansionContext&) = delete;
+  ExpansionContext& operator=(const ExpansionContext&) = delete;
+  void Run();
+
+ private:
+  friend struct Directive;
+
+  // --- Loop
+  void SkipToToken();
+  void ExpandIdentifier(const LexToken& token);
+  void SubstituteInString(const LexToken& token);
+  void ExpandAt();
+  bool ExpandPredefined(const LexToken& name);
+
+  // --- Output
+  void Settle() { FlushTo(m_settled); }
+  void FlushTo(const char* position);
+  void DropTo(const char* position);
+  void DropToScanner() { DropTo(m_scanner.begin); }
+  void EmitGenerated(std::string_view text);
+  int64_t CurrentColumn() const { return m_sink.column < 0 ? m_outIndent : m_sink.column; }
+  const TextRange* AnchorForTemporary() const { return m_anchor ? m_anchor : &m_tokenText; }
+  void StripIndentation(int64_t width);
+  void SwallowLine();
+
+  // --- Expansion of parts of the text
+  void ExpandBlock(const TextRange& block, LSFrame& frame, int indent, int64_t column);
+  std::string ExpandPart(const TextRange& part, int64_t stripIndent = 0);  // in a child frame
+  LexToken Next() { return NextToken(m_scanner); }
+  LexToken RequireIdentifier(std::string_view message);  // fails with the message and the token
+  [[noreturn]] void FailAt(const LexToken& token, std::string message) const;
+
+  // --- Expressions of directives
+  std::string ExpandCondition(const TextRange& raw, std::string_view name);
+  bool EvaluateCondition(const TextRange& raw, std::string_view name);
+  std::string EvaluateString(const TextRange& raw, std::string_view name);
+  std::string ReadStringOrExpression(std::string_view what, bool& wasExpression, LexToken& token);
+
+  // --- Directives
+  void Import();
+  void ImportPath();
+  void RelativePathDirective();
+  void Str(bool wide, bool breakLines);
+  void StrPlain() { Str(false, false); }
+  void StrLines() { Str(false, true); }
+  void StrWide() { Str(true, false); }
+  void StrWideLines() { Str(true, true); }
+  void Unstr();
+  void Quote();
+  void Scope();
+  void If();
+  void While();
+  void For();
+  void Else();
+  void Print(bool endLine);
+  void PrintPlain() { Print(false); }
+  void PrintLine() { Print(true); }
+  void Assert();
+  void AssertFails();
+  void FailDirective();
+  void RunPython();
+  void DefineSubstitution();
+  void ParenExpression();
+  void DoubleExpansion();
+
+  // --- Definitions
+  void Let();
+  void Def() { DefineMacro(false, false, false); }
+  void ExportDef() { DefineMacro(true, false, false); }
+  void NakedDef() { DefineMacro(false, true, false); }
+  void DefPython() { DefineMacro(false, false, true); }
+  void DefineMacro(bool exported, bool naked, bool python);
+  void ReadFormals(LSMacroVariable& macro);
+  void AddMacro(std::unique_ptr<LSMacroVariable> macro, bool fileScope, bool exported);
+  void AddValue(const TextRange& name, VarType type, std::string value);
+
+  // --- Macro call
+  struct BoundArgument {
+    const MacroFormal* formal;
+    TextRange text;
+  };
+  void CallVariable(LSVariable& variable);
+  void CallMacro(const LSMacroVariable& macro);
+  void CallFunctionArgument(const LSMacroVariable& macro);
+  std::vector<BoundArgument> ReadArguments(const LSMacroVariable& macro);
+  void BindArgument(LSFrame& frame, const BoundArgument& argument, const LSMacroVariable& macro);
+  void RunBody(const LSMacroVariable& macro, LSFrame& frame);
+
+  // --- @for
+  struct Loop;
+  Loop ReadLoopHead();
+  void RunLoop(const Loop& loop);
+  void BindElement(const Loop& loop, const TextRange& element, LSFrame& frame);
+
+  ImportHandler* const m_handler;
+  LSFrame& m_frame;
+  ExpansionSink& m_sink;
+  const int64_t m_stripIndent;
+  int64_t m_outIndent;
+  const TextRange m_text;
+  const TextRange* const m_anchor;
+  LexScanner m_scanner;
+  TextRange m_tokenText;  // of the last token of the loop: generated output maps to it
+  const char* m_here = nullptr;  // where that token begins
+  const char* m_pendingBegin;
+  const char* m_settled;
+};
+
+// Expansion into a string of its own; no map is kept.
+std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor);
+
+// A position in a text that is about to end must not survive it.
+void ForgetPosition(LexScannerException& exception, const std::string& text);
+
+// "message + token": the form of most failures of directives.
+std::string WithToken(std::string_view message, const LexToken& token);
+
+}  // namespace qrex

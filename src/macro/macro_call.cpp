@@ -1,0 +1,120 @@
+// What a name stands for: a value, a macro with its arguments, an argument that is called as a function, a Python macro.
+
+#include "lex/sections.h"
+#include "macro/expansion_context.h"
+#include "macro/python_bridge.h"
+
+namespace qrex {
+
+void ExpansionContext::CallVariable(LSVariable& variable) {
+  if (variable.Kind() != VarType::Macro) {
+    DropToScanner();
+    return EmitGenerated(variable.ValueText());
+  }
+  const auto& macro = static_cast<const LSMacroVariable&>(variable);
+  // What the body defines may replace the entry, but a frame keeps its variables to its end.
+  if (macro.isFunctionArgument) return CallFunctionArgument(macro);
+  CallMacro(macro);
+}
+
+std::vector<ExpansionContext::BoundArgument> ExpansionContext::ReadArguments(const LSMacroVariable& macro) {
+  std::vector<BoundArgument> arguments;
+  if (macro.formals.empty()) return arguments;
+  const LexToken open = Next();
+  if (open.kind != kOpenParen) {
+    FailAt(open, "( expected to begin argument list for macro " + macro.Signature() + " when read " + Printed(open));
+  }
+  for (const MacroFormal& formal : macro.formals) {
+    TextRange text;
+    const LexToken end = ReadArgument(m_scanner, text, kCloseParen);
+    const bool isLast = &formal == &macro.formals.back();
+    if (!isLast && end.kind == kCloseParen) {
+      FailAt(end, "Insufficient arguments provided for macro " + macro.Signature());
+    }
+    if (isLast && end.kind == kComma) FailAt(end, "Too many arguments provided for macro " + macro.Signature());
+    arguments.push_back({&formal, text});
+  }
+  return arguments;
+}
+
+// Untyped: the text, which is expanded where it was written, at each use. Typed: its value now.
+void ExpansionContext::BindArgument(LSFrame& frame, const BoundArgument& argument, const LSMacroVariable& macro) {
+  const MacroFormal& formal = *argument.formal;
+  if (formal.type != VarType::Macro) {
+    std::string value;
+    try {
+      value = EvaluateAsText(m_frame, argument.text, formal.type);
+    } catch (LexScannerException& exception) {
+      exception.message += "\n    passing formal argument " + formal.name.Text() + " to macro " + macro.name.Text();
+      throw;
+    }
+    auto variable = std::make_unique<LSValueVariable>(formal.type, std::move(value));
+    variable->name = formal.name;
+    frame.AddVariable(std::move(variable));
+    return;
+  }
+  auto variable = std::make_unique<LSMacroVariable>();
+  variable->name = formal.name;
+  variable->body = argument.text;
+  variable->homeFrame = &m_frame;
+  variable->isFunctionArgument = formal.isFunction;
+  variable->isTemporary = m_anchor != nullptr;
+  frame.AddVariable(std::move(variable));
+}
+
+void ExpansionContext::CallMacro(const LSMacroVariable& macro) {
+  const std::vector<BoundArgument> arguments = ReadArguments(macro);
+  DropToScanner();
+  LSFrame callFrame(macro.homeFrame ? macro.homeFrame : &m_frame);
+  LSFrame& frame = macro.isNaked ? m_frame : callFrame;
+  for (const BoundArgument& argument : arguments) BindArgument(frame, argument, macro);
+  try {
+    RunBody(macro, frame);
+  } catch (LexScannerException& exception) {
+    exception.message += "\n    invoking macro " + macro.Signature();
+    std::string_view separator = " with ";
+    for (const BoundArgument& argument : arguments) {
+      exception.message.append(separator).append(argument.formal->name.View()).append("=");
+      exception.message.append(argument.text.View());
+      separator = ", ";
+    }
+    throw;
+  }
+}
+
+void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
+  if (macro.isPython) {
+    const std::string expression = ExpandAside(frame, macro.body, macro.stripIndent, macro.isTemporary ? AnchorForTemporary() : nullptr);
+    try {
+      EmitGenerated(PythonEvaluate(m_frame, expression, m_tokenText.begin));
+    } catch (LexScannerException& exception) {
+      exception.message += "\n    invoking python macro " + macro.name.Text();
+      throw;
+    }
+  } else if (macro.resultType != VarType::Macro) {
+    EmitGenerated(EvaluateAsText(frame, macro.body, macro.resultType));
+  } else if (!macro.body.Empty()) {
+    const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
+    ExpansionContext(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor).Run();
+  }
+}
+
+void ExpansionContext::CallFunctionArgument(const LSMacroVariable& macro) {
+  const LexToken open = Next();
+  if (open.kind != kOpenParen) {
+    FailAt(open, "( expected to begin argument list for macro " + macro.Signature() + " when read " + Printed(open));
+  }
+  const TextRange raw = ReadParenSection(m_scanner, true);
+  DropToScanner();
+  const std::string arguments = ExpandAside(m_frame, raw, 0, m_anchor);
+  const std::string call = macro.body.Text() + "(" + arguments + ")";
+  LSFrame& home = macro.homeFrame ? *macro.homeFrame : m_frame;
+  try {
+    ExpansionContext(nullptr, home, TextRange(std::string_view(call)), 0, CurrentColumn(), m_sink, AnchorForTemporary()).Run();
+  } catch (LexScannerException& exception) {
+    ForgetPosition(exception, call);
+    throw;
+  }
+}
+
+}  // namespace qrex

@@ -1,0 +1,165 @@
+#include "macro/mpfw_parser.h"
+
+#include <algorithm>
+
+#include "lex/literals.h"
+#include "text/files.h"
+#include "text/paths.h"
+
+namespace qrex {
+
+bool MpfwParser::ImportPath(const std::string& path, const char*) {
+  std::string expanded = path;
+  SubstituteVariables(expanded);
+  context.importPaths.push_back(NormalisePath(expanded));
+  return true;
+}
+
+bool MpfwParser::Import(LSFrame&, const std::string& path, const char* position) {
+  std::string expanded = path;
+  SubstituteVariables(expanded);
+  std::string found;
+  if (!ResolveImport(expanded, found)) throw LexScannerException("Couldn't open file " + expanded, position);
+  if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", position);
+  ++m_importDepth;
+  const bool loaded = LoadSourceFile(found) != nullptr;
+  --m_importDepth;
+  return loaded;
+}
+
+std::unique_ptr<MpfwSourceFile> MpfwParser::CreateSourceFile() { return std::make_unique<MpfwSourceFile>(); }
+
+MpfwSourceFile* MpfwParser::LoadSourceFile(const std::string& path, const std::string& extraText) {
+  std::string text;
+  if (!LoadText(text, path, true)) throw LexScannerException("Couldn't open file " + path, current);
+  std::unique_ptr<MpfwSourceFile> made = CreateSourceFile();
+  MpfwSourceFile& file = *made;
+  file.path = path;
+  file.text = std::move(text) + extraText;
+  context.sourceFiles.push_back(std::move(made));  // ahead of the expansion, so that its errors are found in it
+  return ExpandSourceFile(file) ? &file : nullptr;
+}
+
+bool MpfwParser::ExpandSourceFile(MpfwSourceFile& file) {
+  try {
+    file.expansion =
+        ExpandToStringWithMap(this, context.rootFrame, TextRange(std::string_view(file.text)), 0, 0, file.map);
+    return true;
+  } catch (const LexScannerException& exception) {
+    TraceWriter trace;
+    ReportParseError(context.sourceFiles, trace, exception);
+    return false;
+  }
+}
+
+void MpfwParser::SubstituteVariables(std::string& text) const { context.rootFrame.Substitute(text); }
+
+void MpfwParser::ReadString(std::string& out) {
+  if (current.kind != kSingleQuoted && current.kind != kDoubleQuoted) {
+    throw LexScannerException("Expected quoted string when read " + Printed(current), current);
+  }
+  DecodeString(current, out);
+  SubstituteVariables(out);
+}
+
+void MpfwParser::ReadPath(std::string& out) {
+  ReadString(out);
+  if (out.find('\\') != std::string::npos) {
+    throw LexScannerException("Forward slashes must be used in " + Printed(current), current);
+  }
+}
+
+void MpfwParser::ReadStringOrExpression(std::string& out) {
+  if (current.kind != kOpenParen) {
+    ReadString(out);
+    Advance();
+    return;
+  }
+  Advance();
+  out = ReadStringValue();
+  Expect(kCloseParen, ")");
+  SubstituteVariables(out);
+}
+
+void MpfwParser::ReadNamedString(const std::string& name, std::string& out) {
+  auto fail = [&](const std::string& expected) {
+    throw LexScannerException("Expected " + expected + " when read " + Printed(current), current);
+  };
+  if (current.kind != kDollar) fail("'$'");
+  Advance();
+  if (current.kind != kIdentifier || !current.Is(name)) fail("'" + name + "'");
+  Advance();
+  Expect(kAssign, "=");
+  if (current.kind != kDoubleQuoted) fail("quoted string");
+  DecodeString(current, out);
+}
+
+void MpfwParser::ReadNamedPath(const std::string& name, std::string& out) {
+  ReadNamedString(name, out);
+  const LexToken path = current;
+  Advance();
+  if (out.find('\\') != std::string::npos) {
+    throw LexScannerException("Forward slashes must be used in " + Printed(path), path);
+  }
+  if (!out.empty() && out.back() == '/') {
+    throw LexScannerException("Path can't end with a trailing slash : " + Printed(path), path);
+  }
+}
+
+bool MpfwParser::ParseImportStatement() {
+  if (current.kind != kAt) return false;
+  Advance();
+  if (!current.Is("import")) throw LexScannerException("Syntax error: @" + Printed(current), current);
+  Advance();
+  std::string path, found;
+  ReadString(path);
+  if (!ResolveImport(path, found)) throw LexScannerException("Couldn't open file " + path, previous);
+  const auto& files = context.sourceFiles;
+  auto file = std::find_if(files.begin(), files.end(),
+                           [&](const auto& candidate) { return EqualIgnoringCase(candidate->path, found); });
+  if (file != files.end()) OnImportedFile(**file);
+  Advance();
+  return true;
+}
+
+bool MpfwParser::ParseVariableStatement(std::string* name, std::string* value) {
+  if (current.kind != kDollar) return false;
+  Advance();
+  const std::string variable = ReadIdentifier();
+  Expect(kAssign, "=");
+  std::string text;
+  if (current.Is("path")) {
+    Advance();
+    ReadStringOrExpression(text);
+    text = NormalisePath(text);
+  } else {
+    ReadStringOrExpression(text);
+  }
+  context.rootFrame.DefineSubstitution(variable, text);
+  if (name) *name = variable;
+  if (value) *value = text;
+  return true;
+}
+
+void MpfwParser::ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*parse)(MpfwParser& parser)) {
+  if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", current);
+  parser.m_importDepth = m_importDepth + 1;
+  const TextRange expansion{std::string_view(file.expansion)};
+  const LexToken leftover = [&] {
+    try {
+      parser.SetInput(expansion);
+      parse(parser);
+      return parser.current;
+    } catch (LexScannerException& exception) {
+      MapErrorPosition(file.map, expansion, exception);
+      TraceWriter trace;
+      ReportParseError(context.sourceFiles, trace, exception);
+      throw LexScannerException("while processing @import of " + file.path, current);
+    }
+  }();
+  if (leftover.kind != kEndOfText) {
+    throw LexScannerException("Syntax error when read '" + Printed(leftover) + "' in " + file.path, current);
+  }
+}
+
+}  // namespace qrex
