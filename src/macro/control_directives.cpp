@@ -113,7 +113,8 @@ ExpansionContext::Loop ExpansionContext::ReadLoopHead() {
     do {
       loop.variables.push_back(RequireIdentifier("Identifier expected when read ").text);
       token = Next();
-      if (token.kind != kComma && token.kind != kCloseParen) FailAt(token, WithToken(", or ) expected when read ", token));
+      if (token.kind != kComma && token.kind != kCloseParen)
+        FailAt(token, WithToken(", or ) expected when read ", token));
     } while (token.kind == kComma);
   }
   token = Next();
@@ -163,8 +164,8 @@ void ExpansionContext::RunLoop(const Loop& loop) {
       try {
         ExpandBlock(loop.block, frame, loop.indent, loop.column);
       } catch (LexScannerException& exception) {
-        exception.message += "\n    in @for directive when " + (loop.isTuple ? "" : loop.variables[0].Text()) + " = " +
-                             element.Text();
+        exception.message +=
+            "\n    in @for directive when " + (loop.isTuple ? "" : loop.variables[0].Text()) + " = " + element.Text();
         throw;
       }
     }

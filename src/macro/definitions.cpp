@@ -46,7 +46,8 @@ void ExpansionContext::Let() {
 
   std::string value;
   if (isVerbatim) {
-    if (type != VarType::String) FailAt(token, "@let directive failed: " + name + " := may only be used for string type");
+    if (type != VarType::String)
+      FailAt(token, "@let directive failed: " + name + " := may only be used for string type");
     value = ExpandPart(text, indent);
   } else {
     try {
@@ -82,7 +83,8 @@ void ExpansionContext::DefineMacro(bool exported, bool naked, bool python) {
   if (token.kind == kOpenParen) {
     ReadFormals(*macro);
     token = Next();
-    if (token.kind != kAssign) FailAt(token, "= expected in definition of macro " + name + " when read " + Printed(token));
+    if (token.kind != kAssign)
+      FailAt(token, "= expected in definition of macro " + name + " when read " + Printed(token));
   } else if (token.kind != kAssign) {
     FailAt(token, "= or ( expected for definition of macro " + name + " when read " + Printed(token));
   }

@@ -73,8 +73,8 @@ void ExpansionContext::ParenExpression() {
   DropToScanner();
   const std::string expansion = ExpandPart(raw);
   EmitGenerated(ReadExpression(
-      expansion, "@(", ")", m_tokenText.begin,
-      [](ExpressionParser& parser) { return parser.ReadStringValue(true); }, "when read "));
+      expansion, "@(", ")", m_tokenText.begin, [](ExpressionParser& parser) { return parser.ReadStringValue(true); },
+      "when read "));
 }
 
 void ExpansionContext::DoubleExpansion() {

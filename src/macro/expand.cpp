@@ -48,15 +48,23 @@ void ExpansionContext::Run() {
     const LexToken token = NextToken(m_scanner, true);
     m_tokenText = token.text;
     switch (token.kind) {
-      case kEndOfText: return FlushTo(m_scanner.begin);
-      case kIdentifier: ExpandIdentifier(token); break;
-      case kDoubleQuoted: SubstituteInString(token); break;
+      case kEndOfText:
+        return FlushTo(m_scanner.begin);
+      case kIdentifier:
+        ExpandIdentifier(token);
+        break;
+      case kDoubleQuoted:
+        SubstituteInString(token);
+        break;
       case kMacroComment:
         Settle();
         SwallowLine();
         break;
-      case kAt: ExpandAt(); break;
-      default: break;
+      case kAt:
+        ExpandAt();
+        break;
+      default:
+        break;
     }
     m_settled = m_scanner.begin;
   }
@@ -108,13 +116,19 @@ void ExpansionContext::ExpandAt() {
     case kAt:
       FlushTo(m_here);
       return DropToScanner();
-    case kOpenBracket: FlushTo(m_here); return DoubleExpansion();
-    case kOpenParen: FlushTo(m_here); return ParenExpression();
+    case kOpenBracket:
+      FlushTo(m_here);
+      return DoubleExpansion();
+    case kOpenParen:
+      FlushTo(m_here);
+      return ParenExpression();
     case kDollar:
       if (m_handler) DefineSubstitution();
       return;
-    case kIdentifier: break;
-    default: return;
+    case kIdentifier:
+      break;
+    default:
+      return;
   }
   const Directive* directive = FindDirective(token.text.View());
   if (!directive) {
@@ -158,13 +172,18 @@ void ExpansionContext::FlushTo(const char* position) {
 
 void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
 
-void ExpansionContext::EmitGenerated(std::string_view text) { m_sink.WriteGenerated(text, *AnchorForTemporary(), m_outIndent); }
+void ExpansionContext::EmitGenerated(std::string_view text) {
+  m_sink.WriteGenerated(text, *AnchorForTemporary(), m_outIndent);
+}
 
 void ExpansionContext::StripIndentation(int64_t width) {
   for (int64_t column = 0; column < width && !m_scanner.AtEnd(); ++m_scanner.begin) {
-    if (*m_scanner.begin == ' ') ++column;
-    else if (*m_scanner.begin == '\t') column += kTabWidth;
-    else return;
+    if (*m_scanner.begin == ' ')
+      ++column;
+    else if (*m_scanner.begin == '\t')
+      column += kTabWidth;
+    else
+      return;
   }
 }
 
@@ -172,8 +191,10 @@ void ExpansionContext::SwallowLine() {
   const char* behindLine = nullptr;
   for (; !m_scanner.AtEnd(); ++m_scanner.begin) {
     const char c = *m_scanner.begin;
-    if (c == '\n') behindLine = m_scanner.begin + 1;
-    else if (c != ' ' && c != '\t') break;
+    if (c == '\n')
+      behindLine = m_scanner.begin + 1;
+    else if (c != ' ' && c != '\t')
+      break;
   }
   if (behindLine) m_scanner.begin = behindLine;
   StripIndentation(m_stripIndent);
@@ -235,15 +256,19 @@ namespace {
 
 std::string ReadCanonical(ExpressionParser& parser, VarType type) {
   switch (type) {
-    case VarType::Bool: return parser.ReadBool() ? "true" : "false";
-    case VarType::Int: return std::to_string(parser.ReadInt32());
-    case VarType::Double: return ToString(parser.ReadFloat64());
+    case VarType::Bool:
+      return parser.ReadBool() ? "true" : "false";
+    case VarType::Int:
+      return std::to_string(parser.ReadInt32());
+    case VarType::Double:
+      return ToString(parser.ReadFloat64());
     case VarType::Char: {
       std::string text;
       WriteCharLiteral(text, static_cast<char>(parser.ReadChar()));
       return text;
     }
-    default: return parser.ReadStringValue();
+    default:
+      return parser.ReadStringValue();
   }
 }
 

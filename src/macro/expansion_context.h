@@ -1,8 +1,8 @@
 // The state of one run of the expansion loop over one text, shared by the loop (expand.cpp), the directives
 // (directives.cpp, control_directives.cpp, definitions.cpp) and the macro call (macro_call.cpp).
 //
-// Source text that passes through is not copied token by token: what lies between `m_pendingBegin` and `m_settled` is due
-// for the output and goes there in one run, when something other is to be written or dropped.
+// Source text that passes through is not copied token by token: what lies between `m_pendingBegin` and `m_settled` is
+// due for the output and goes there in one run, when something other is to be written or dropped.
 #pragma once
 
 #include <memory>
@@ -123,7 +123,7 @@ class ExpansionContext {
   const TextRange m_text;
   const TextRange* const m_anchor;
   LexScanner m_scanner;
-  TextRange m_tokenText;  // of the last token of the loop: generated output maps to it
+  TextRange m_tokenText;         // of the last token of the loop: generated output maps to it
   const char* m_here = nullptr;  // where that token begins
   const char* m_pendingBegin;
   const char* m_settled;

@@ -189,8 +189,8 @@ void LSFileFrame::AddOrderedImport(LSFileFrame& imported) {
   m_orderedImports.push_back(&imported);
 }
 
-// Where several definitions are in view, those of nearer files hide those of the files that they import; only direct imports
-// that really disagree are ambiguous. Each frame is asked once.
+// Where several definitions are in view, those of nearer files hide those of the files that they import; only direct
+// imports that really disagree are ambiguous. Each frame is asked once.
 class LSFileFrame::NearestDefinition {
  public:
   NearestDefinition(std::string_view name, const char* position) : m_name(name), m_position(position) {}

@@ -105,15 +105,15 @@ class LSFrame {
  protected:
   virtual void OnAdded(LSVariable&) {}
 
-  std::vector<std::unique_ptr<LSVariable>> m_variables;            // oldest first
-  std::unordered_map<std::string_view, LSVariable*> m_names;       // the newest of each name
+  std::vector<std::unique_ptr<LSVariable>> m_variables;       // oldest first
+  std::unordered_map<std::string_view, LSVariable*> m_names;  // the newest of each name
   LSFrame* m_parent;
   LSFileFrame* m_fileFrame;
 };
 
 // The frame of a file. Every identifier of every text is looked up through all imports, so this must not cost time that
-// grows with their number: one table lists the definitions of each name in all file frames, and each frame keeps the set of
-// the frames that it sees. A name that stands nowhere is answered by one probe.
+// grows with their number: one table lists the definitions of each name in all file frames, and each frame keeps the
+// set of the frames that it sees. A name that stands nowhere is answered by one probe.
 class LSFileFrame : public LSFrame {
  public:
   explicit LSFileFrame(LSFrame* parent = nullptr);

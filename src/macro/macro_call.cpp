@@ -1,4 +1,5 @@
-// What a name stands for: a value, a macro with its arguments, an argument that is called as a function, a Python macro.
+// What a name stands for: a value, a macro with its arguments, an argument that is called as a function, a Python
+// macro.
 
 #include "lex/sections.h"
 #include "macro/expansion_context.h"
@@ -84,7 +85,8 @@ void ExpansionContext::CallMacro(const LSMacroVariable& macro) {
 
 void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
   if (macro.isPython) {
-    const std::string expression = ExpandAside(frame, macro.body, macro.stripIndent, macro.isTemporary ? AnchorForTemporary() : nullptr);
+    const std::string expression =
+        ExpandAside(frame, macro.body, macro.stripIndent, macro.isTemporary ? AnchorForTemporary() : nullptr);
     try {
       EmitGenerated(PythonEvaluate(m_frame, expression, m_tokenText.begin));
     } catch (LexScannerException& exception) {
@@ -110,7 +112,8 @@ void ExpansionContext::CallFunctionArgument(const LSMacroVariable& macro) {
   const std::string call = macro.body.Text() + "(" + arguments + ")";
   LSFrame& home = macro.homeFrame ? *macro.homeFrame : m_frame;
   try {
-    ExpansionContext(nullptr, home, TextRange(std::string_view(call)), 0, CurrentColumn(), m_sink, AnchorForTemporary()).Run();
+    ExpansionContext(nullptr, home, TextRange(std::string_view(call)), 0, CurrentColumn(), m_sink, AnchorForTemporary())
+        .Run();
   } catch (LexScannerException& exception) {
     ForgetPosition(exception, call);
     throw;

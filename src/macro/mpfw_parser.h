@@ -59,8 +59,8 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   bool ExpandSourceFile(MpfwSourceFile& file);
 
  protected:
-  // The common part of OnImportedFile: runs `parse` with a parser of its own over the file's expansion. An error is written,
-  // and "while processing @import of " is raised at the @import; so is what stands behind the last statement.
+  // The common part of OnImportedFile: runs `parse` with a parser of its own over the file's expansion. An error is
+  // written, and "while processing @import of " is raised at the @import; so is what stands behind the last statement.
   void ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*parse)(MpfwParser& parser));
 
   MpfwContext& context;
