@@ -105,9 +105,9 @@ struct ExpressionGrammar {
   }
 
   Literal Conditional() {
-    Nesting nesting(*this);
     Literal condition = Binary(0);
     if (Kind() != kQuestion) return condition;
+    Nesting nesting(*this);
     parser.Advance();
     Literal whenTrue = Assignment();
     parser.Expect(kColon, ":");

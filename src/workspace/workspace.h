@@ -29,6 +29,10 @@ class Workspace {
   std::string rootDir;
   std::string relativeDir;
   std::map<std::string, ProjectFile*> fileMap;
+
+ private:
+  static constexpr int kMaxLoadDepth = 1000;
+  int m_loadDepth = 0;
 };
 
 // A project entry without the extension qrpj stands for entry/src/last.qrpj.
