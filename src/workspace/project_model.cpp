@@ -4,6 +4,7 @@
 #include <unordered_map>
 
 #include "text/paths.h"
+#include "workspace/switch_blocks.h"
 #include "workspace/workspace.h"
 
 namespace qrex {
@@ -78,13 +79,6 @@ namespace {
 void AddFoldersOf(ProjectFolder& folder, std::vector<ProjectFolder*>& folders) {
   for (const auto& subfolder : folder.subfolders) AddFoldersOf(*subfolder, folders);
   folders.push_back(&folder);
-}
-
-bool CreatesPrecompiledHeader(const ProjectFile& file) {
-  if (file.configRecords.empty()) return false;
-  const OptionMap& options = file.configRecords.front()->options;
-  auto found = options.find("UsePrecompiledHeader");
-  return found != options.end() && found->second == "1";
 }
 
 }  // namespace

@@ -44,7 +44,6 @@ ProjectFile* Workspace::FindFile(const std::string& path) const {
   return found == fileMap.end() ? nullptr : found->second;
 }
 
-
 Project* Workspace::LoadProject(const std::string& path) {
   const std::string stem = StemOrEmpty(path);
   if (Project* loaded = FindProjectByName(stem)) return loaded;
@@ -193,7 +192,8 @@ bool Workspace::CheckFileReferences() {
     if (project->targetType == TargetType::StaticLibrary) AddStaticDefine(*project, project->name);
     for (const std::string& path : project->subprojects) {
       const Project* subproject = FindSubproject(path);
-      if (subproject && subproject->targetType == TargetType::StaticLibrary) AddStaticDefine(*project, subproject->name);
+      if (subproject && subproject->targetType == TargetType::StaticLibrary)
+        AddStaticDefine(*project, subproject->name);
     }
   }
   for (const auto& project : projects) {

@@ -1,0 +1,253 @@
+// The file tree of a project file: folders, names, searches with wildcards, and options of files.
+
+#include <algorithm>
+
+#include "lex/literals.h"
+#include "text/files.h"
+#include "text/numbers.h"
+#include "text/paths.h"
+#include "workspace/project_parser.h"
+#include "workspace/switch_blocks.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr int kMaxNesting = 1000;
+
+bool HoldsWildcard(const LexToken& token) {
+  return token.kind == kDoubleQuoted && token.text.View().find_first_of("*?") != std::string_view::npos;
+}
+
+}  // namespace
+
+void ProjectParser::ParseTree(ProjectFolder& folder, const std::string& directory) {
+  if (++m_depth > kMaxNesting) throw LexScannerException("Blocks nested too deeply", current);
+  RequireBrace();
+  while (current.kind != kCloseBrace) ParseEntry(folder, directory);
+  --m_depth;
+  if (m_depth > 0) Advance();  // behind the last block the text need not be readable
+}
+
+void ProjectParser::ParseEntry(ProjectFolder& folder, const std::string& directory) {
+  if (current.Is("directories")) {
+    ParseDirectories();
+  } else if (IsFilterNext()) {
+    ParseSearch(folder, directory);
+  } else {
+    ParseName(folder, directory);
+  }
+}
+
+// --- Filters
+
+bool ProjectParser::IsFilterNext() const {
+  return HoldsWildcard(current) || current.kind == kOpenBracket || current.kind == kPlus || current.kind == kMinus;
+}
+
+void ProjectParser::ReadPatterns(FileFilter& filter) {
+  Advance();
+  while (current.kind != kCloseBracket) {
+    ReadString(filter.patterns.emplace_back());
+    Advance();
+  }
+  Advance();
+}
+
+FileFilter ProjectParser::ReadFilter() {
+  FileFilter filter;
+  if (current.kind == kDoubleQuoted) {
+    ReadString(filter.patterns.emplace_back());
+    Advance();
+    return filter;
+  }
+  const bool hasSign = current.kind != kOpenBracket;
+  if (hasSign) {
+    filter.include = current.kind == kPlus;
+    Advance();
+  }
+  if (current.kind == kOpenBracket) {
+    ReadPatterns(filter);
+  } else if (current.kind == kDoubleQuoted) {
+    ReadString(filter.patterns.emplace_back());
+    Advance();
+  } else {
+    throw LexScannerException("Expected [ after + or - when read " + Printed(current), current);
+  }
+  return filter;
+}
+
+void ProjectParser::ParseDirectories() {
+  Advance();
+  if (!IsFilterNext()) {
+    throw LexScannerException("Expected '[', '+' or '-' when read " + Printed(current), current);
+  }
+  FileFilter filter = ReadFilter();
+  m_directoryFilter.include = filter.include;
+  m_directoryFilter.patterns.insert(m_directoryFilter.patterns.end(), filter.patterns.begin(), filter.patterns.end());
+}
+
+// --- Search
+
+void ProjectParser::ParseSearch(ProjectFolder& folder, const std::string& directory) {
+  Search search;
+  search.filter = ReadFilter();
+  if (current.Is("flat")) {
+    search.flat = true;
+    Advance();
+    if (current.kind != kStar) FailExpected("*");
+  }
+  if (current.kind == kStar) {
+    search.recurse = true;
+    Advance();
+  }
+  for (const std::string& root : m_project.settings->virtualTree) Find(search, root, folder, directory);
+  if (current.kind == kColon) ParseFileOptions(search.matched);
+}
+
+void ProjectParser::Find(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory) {
+  if (++search.depth > kMaxNesting) throw LexScannerException("Directories nested too deeply", current);
+  std::vector<std::string> names;
+  FileOrDirIterator entries(PathJoin(root, directory) + "/*");
+  while (const IFileOrDirInfo* entry = entries.Next()) {
+    const std::string name = entry->Name();
+    if (name == "." || name == ".." || entry->IsHidden() || entry->IsSystem()) continue;
+    if (!entry->IsDirectory()) {
+      if (search.filter.Passes(name)) names.push_back(name);
+    } else if (search.recurse && m_directoryFilter.Passes(name)) {
+      FindInSubdirectory(search, root, folder, directory, name);
+    }
+  }
+  for (const std::string& name : names) {
+    search.matched.push_back(&AddFile(folder, PathJoin(directory, name), name));
+  }
+  --search.depth;
+}
+
+void ProjectParser::FindInSubdirectory(Search& search, const std::string& root, ProjectFolder& folder,
+                                       const std::string& directory, const std::string& name) {
+  const std::string subdirectory = PathJoin(directory, name);
+  if (search.flat) return Find(search, root, folder, subdirectory);
+  bool isNew = false;
+  ProjectFolder& subfolder = FolderNamed(folder, name, &isNew);
+  const size_t matchedBefore = search.matched.size();
+  Find(search, root, subfolder, subdirectory);
+  if (isNew && search.matched.size() == matchedBefore) folder.subfolders.pop_back();
+}
+
+// --- Names
+
+void ProjectParser::ParseName(ProjectFolder& folder, const std::string& directory) {
+  std::string name, displayName;
+  ReadPath(name);
+  Advance();
+  const bool hasDisplayName = current.Is("as");
+  if (hasDisplayName) {
+    Advance();
+    ReadString(displayName);
+    Advance();
+  }
+  if (current.kind == kOpenBrace) {
+    return ParseNestedBlock(folder, directory, name, hasDisplayName ? &displayName : nullptr);
+  }
+  ProjectFile& file = AddFile(folder, PathJoin(directory, name), hasDisplayName ? displayName : name);
+  if (current.kind == kColon) ParseFileOptions({&file});
+}
+
+void ProjectParser::ParseNestedBlock(ProjectFolder& folder, const std::string& directory, const std::string& name,
+                                     const std::string* displayName) {
+  const std::string nested = name.empty() ? directory : PathJoin(directory, name);
+  std::string folderName = displayName ? *displayName : name;
+  if (!displayName && name.compare(0, 2, "..") == 0) folderName = nested.empty() ? "$" : nested;
+  ParseTree(folderName.empty() ? folder : FolderNamed(folder, folderName), nested);
+}
+
+ProjectFolder& ProjectParser::FolderNamed(ProjectFolder& parent, const std::string& name, bool* isNew) {
+  for (const auto& subfolder : parent.subfolders) {
+    if (subfolder->name == name) return *subfolder;
+  }
+  if (isNew) *isNew = true;
+  parent.subfolders.push_back(std::make_unique<ProjectFolder>());
+  ProjectFolder& made = *parent.subfolders.back();
+  made.project = &m_project;
+  made.name = name;
+  return made;
+}
+
+// A file that is named again stays in its first folder.
+ProjectFile& ProjectParser::AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName) {
+  std::unique_ptr<ProjectFile>& slot = m_project.filesByPath[path];
+  if (slot) return *slot;
+  slot = std::make_unique<ProjectFile>();
+  ProjectFile& file = *slot;
+  file.project = &m_project;
+  file.path = path;
+  file.name = displayName;
+  if (!StemOf(displayName, file.stem)) file.stem = std::string(FileNameOf(displayName));
+  const size_t dot = displayName.rfind('.');
+  if (dot != std::string::npos) file.extension = displayName.substr(dot + 1);
+  ToLower(file.extension);
+  file.kind = FileKindOf(file.extension);
+  file.isMainSource = file.kind == FileKind::Cpp && file.stem == m_project.name;
+  file.isPublicHeader = file.kind == FileKind::H && IsLibrary(m_project.targetType) &&
+                        path.compare(0, m_project.sourceDir.size(), m_project.sourceDir) != 0;
+  folder.files.push_back(&file);
+  return file;
+}
+
+// --- Options of files
+
+void ProjectParser::ParseFileOptions(const Files& files) {
+  do {
+    Advance();
+    ParseFileOption(files);
+  } while (current.kind == kComma);
+}
+
+void ProjectParser::ParseExclude(const Files& files) {
+  Advance();
+  if (current.kind != kOpenParen) {
+    for (ProjectFile* file : files) file->excluded = true;
+    return;
+  }
+  for (ProjectConfig* config : ReadScope()) {
+    for (ProjectFile* file : files) file->RecordOf(*config).excluded = true;
+  }
+}
+
+void ProjectParser::ParseFileOption(const Files& files) {
+  if (current.Is("exclude")) return ParseExclude(files);
+  if (current.kind != kPlus && current.kind != kMinus) {
+    throw LexScannerException("Unknown option : " + Printed(current), current);
+  }
+  const bool add = current.kind == kPlus;
+  Advance();
+  if (!current.Is("cpp")) throw LexScannerException("Expected 'cpp' when read " + Printed(current), current);
+  Advance();
+  const Configs configs = ReadScope();
+  if (KeepsRawText()) {
+    const std::string block = ReadRawBlock();
+    for (ProjectConfig* config : configs) {
+      for (ProjectFile* file : files) {
+        FileConfigRecord& record = file->RecordOf(*config);
+        std::string& text = add ? record.addText : record.removeText;
+        text = ForConfig(text + " " + block, *config);
+      }
+    }
+    return;
+  }
+  const SwitchChanges changes = ReadCompilerSwitches(*this, !add);
+  for (ProjectConfig* config : configs) {
+    for (ProjectFile* file : files) {
+      FileConfigRecord& record = file->RecordOf(*config);
+      if (add) {
+        changes.Apply(record.options);
+      } else {
+        changes.ApplyToFile(record.options, config->compilerOptions);
+      }
+      SubstituteInOptions(record.options, *config);
+    }
+  }
+}
+
+}  // namespace qrex

@@ -1,0 +1,84 @@
+// Reads a project file: heads, statements, then the file tree.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "macro/mpfw_parser.h"
+#include "workspace/file_filter.h"
+#include "workspace/project_model.h"
+
+namespace qrex {
+
+// Finds, reads, expands and parses the project's file; false after an error, which is reported.
+bool LoadProjectFile(Project& project, const std::string& path);
+
+class ProjectParser : public MpfwParser {
+ public:
+  ProjectParser(Project& project, FileFilter& directoryFilter)
+      : MpfwParser(project.context), m_project(project), m_directoryFilter(directoryFilter) {}
+
+  bool ResolveImport(const std::string& path, std::string& found) override;
+  void OnImportedFile(MpfwSourceFile& file) override;
+
+  void ParseProject();     // on the processed text
+  void ParseStatements();  // until a token that begins none
+
+ private:
+  using Configs = std::vector<ProjectConfig*>;
+  using Files = std::vector<ProjectFile*>;
+
+  void ReadHead(const std::string& name, std::string& out);
+  void ParseHeads();
+  void SetTargetType(const std::string& text);
+  bool ParseStatement();
+  void ParseConfig();
+  ProjectConfig& AddConfig();
+  void ParseSubprojects();
+  void ParseToolFiles();
+  void ParseBuildEvent(BuildEvent ProjectConfig::*event);
+  void ParseGeneral();
+  bool ParseOptions(bool add);
+  Configs ReadScope();
+  bool IsSelected(const ProjectConfig& config, std::string_view spec) const;
+  std::string ReadRawBlock();
+  void AppendRawBlock(const Configs& configs, std::string ProjectConfig::*text);
+  std::string ForConfig(std::string text, const ProjectConfig& config) const;  // $(PLATFORM), $(CONFIG)
+  void SubstituteInOptions(OptionMap& options, const ProjectConfig& config) const;
+  void RequireBrace();
+  bool KeepsRawText() const;  // compilers whose switches stay text
+
+  // --- File tree (project_files.cpp)
+  void ParseTree(ProjectFolder& folder, const std::string& directory);
+  void ParseEntry(ProjectFolder& folder, const std::string& directory);
+  void ParseName(ProjectFolder& folder, const std::string& directory);
+  void ParseNestedBlock(ProjectFolder& folder, const std::string& directory, const std::string& name,
+                        const std::string* displayName);
+  bool IsFilterNext() const;
+  FileFilter ReadFilter();
+  void ReadPatterns(FileFilter& filter);
+  void ParseDirectories();
+  void ParseSearch(ProjectFolder& folder, const std::string& directory);
+  struct Search {
+    FileFilter filter;
+    bool recurse = false;
+    bool flat = false;
+    Files matched;
+    int depth = 0;
+  };
+  void Find(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory);
+  void FindInSubdirectory(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory,
+                          const std::string& name);
+  ProjectFile& AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName);
+  ProjectFolder& FolderNamed(ProjectFolder& parent, const std::string& name, bool* isNew = nullptr);
+  void ParseFileOptions(const Files& files);
+  void ParseFileOption(const Files& files);
+  void ParseExclude(const Files& files);
+
+  Project& m_project;
+  FileFilter& m_directoryFilter;
+  int m_depth = 0;
+};
+
+}  // namespace qrex
