@@ -4,6 +4,7 @@
 #include <sys/wait.h>
 #include <unistd.h>
 
+#include <algorithm>
 #include <boost/uuid/random_generator.hpp>
 #include <boost/uuid/uuid.hpp>
 #include <chrono>
@@ -11,6 +12,8 @@
 #include <ctime>
 #include <exception>
 #include <string_view>
+
+#include "platform/file_system.h"
 
 namespace qrex::platform {
 
@@ -61,10 +64,54 @@ std::array<uint8_t, 16> MakeUuid() {
   return bytes;
 }
 
+namespace {
+
+bool IsOnPath(const std::string& program) {
+  const char* path = std::getenv("PATH");
+  std::string_view rest = path ? path : "";
+  while (!rest.empty()) {
+    const size_t end = std::min(rest.find(kPathListSeparator), rest.size());
+    if (access((std::string(rest.substr(0, end)) + "/" + program).c_str(), X_OK) == 0) return true;
+    rest.remove_prefix(std::min(end + 1, rest.size()));
+  }
+  return false;
+}
+
+// The batch file that marks a manifest's update is the one that this system has to carry out:
+// `@echo TEXT >"FILE"`, with %TIME% and %DATE%.
+int RunBatchFile(std::string path) {
+  std::replace(path.begin(), path.end(), '\\', '/');
+  std::string content;
+  if (!ReadFile(path, content)) return 1;
+  const size_t begin = content.find("@echo "), arrow = content.rfind(" >\""), end = content.rfind('"');
+  if (begin != 0 || arrow == std::string::npos || end <= arrow + 3) return 1;
+  std::string text = content.substr(6, arrow - 6);
+  std::string target = content.substr(arrow + 3, end - arrow - 3);
+  std::replace(target.begin(), target.end(), '\\', '/');
+  const LocalTime now = CurrentLocalTime();
+  auto replace = [&](std::string_view name, const std::string& value) {
+    const size_t at = text.find(name);
+    if (at != std::string::npos) text.replace(at, name.size(), value);
+  };
+  replace("%TIME%", std::to_string(now.hour) + ":" + std::to_string(now.minute) + ":" + std::to_string(now.second));
+  replace("%DATE%", std::to_string(now.day) + "/" + std::to_string(now.month) + "/" + std::to_string(now.year));
+  return WriteFile(target, text + "\n", false) ? 0 : 1;
+}
+
+}  // namespace
+
 int RunCommand(const std::string& line) {
   constexpr std::string_view kInterpreter = "cmd /c ";
-  const bool isWrapped = line.compare(0, kInterpreter.size(), kInterpreter) == 0;
-  const int status = std::system(isWrapped ? line.c_str() + kInterpreter.size() : line.c_str());
+  constexpr std::string_view kCompiler = "gcc-4 ";
+  constexpr std::string_view kBatchEnd = ".bat\"";
+  std::string command =
+      line.compare(0, kInterpreter.size(), kInterpreter) == 0 ? line.substr(kInterpreter.size()) : line;
+  if (command.compare(0, kCompiler.size(), kCompiler) == 0 && !IsOnPath("gcc-4")) command.erase(3, 2);
+  if (command.size() > kBatchEnd.size() + 1 && command.front() == '"' &&
+      command.compare(command.size() - kBatchEnd.size(), kBatchEnd.size(), kBatchEnd) == 0) {
+    return RunBatchFile(command.substr(1, command.size() - 2));
+  }
+  const int status = std::system(command.c_str());
   if (status == -1) return -1;
   return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
 }

@@ -1,0 +1,135 @@
+#include "build/dependency_file.h"
+
+#include "text/files.h"
+#include "text/numbers.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr uint32_t kMagic = 0x2AEF78F1;
+
+void AppendNumber(std::string& out, uint64_t value, size_t bytes) {
+  for (size_t i = 0; i < bytes; ++i) out += static_cast<char>(value >> (8 * i));
+}
+
+void AppendRegistry(std::string& out, const DeclarationRegistry& registry) {
+  AppendCompactLength(out, registry.entries.size());
+  for (const auto& [path, names] : registry.entries) {
+    AppendCompactString(out, path);
+    AppendCompactLength(out, names.size());
+    for (const std::string& name : names) AppendCompactString(out, name);
+  }
+}
+
+// Reads the payload piece by piece; whatever does not fit raises.
+class PayloadReader {
+ public:
+  explicit PayloadReader(std::string_view payload) : m_rest(payload) {}
+
+  uint64_t Number(size_t bytes) {
+    if (m_rest.size() < bytes) throw DeserialisationException();
+    uint64_t value = 0;
+    for (size_t i = bytes; i-- > 0;) value = value << 8 | static_cast<unsigned char>(m_rest[i]);
+    m_rest.remove_prefix(bytes);
+    return value;
+  }
+
+  uint64_t Length() {
+    uint64_t length;
+    if (!ReadCompactLength(m_rest, length)) throw DeserialisationException();
+    return length;
+  }
+
+  std::string String() {
+    std::string_view text;
+    if (!ReadCompactString(m_rest, text)) throw DeserialisationException();
+    return std::string(text);
+  }
+
+  void Registry(DeclarationRegistry& registry) {
+    registry.entries.clear();
+    registry.dirty = false;
+    for (uint64_t files = Length(); files > 0; --files) {
+      std::vector<std::string>& names = registry.entries[String()];
+      for (uint64_t count = Length(); count > 0; --count) names.push_back(String());
+    }
+  }
+
+ private:
+  std::string_view m_rest;
+};
+
+ScannedFile* FindScanned(ProjectBuilder& builder, const std::string& path) {
+  ProjectFile* file = builder.FindFile(path);
+  if (file) return &builder.GetScannedFile(*file);
+  TraceWriter() << "*** Cannot find file " << path << "\n";
+  return nullptr;
+}
+
+}  // namespace
+
+std::string DependencyPayload(const ProjectBuilder& builder) {
+  std::string payload;
+  for (const auto& [path, file] : builder.scannedByPath) {
+    AppendCompactString(payload, path);
+    AppendNumber(payload, static_cast<uint64_t>(file->translationTime), 8);
+    AppendNumber(payload, file->imports.size(), 4);
+    for (const ScannedFile* import : file->imports) AppendCompactString(payload, import->file.path);
+    payload += file->hasDeclarations ? '\1' : '\0';
+  }
+  AppendCompactString(payload, "");
+  AppendRegistry(payload, builder.registerMap);
+  AppendRegistry(payload, builder.unregisterMap);
+  return payload;
+}
+
+bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload) {
+  PayloadReader reader(payload);
+  for (std::string path; !(path = reader.String()).empty();) {
+    ScannedFile* file = FindScanned(builder, path);
+    if (!file) return false;
+    file->translationTime = static_cast<int64_t>(reader.Number(8));
+    for (uint64_t count = reader.Number(4); count > 0; --count) {
+      ScannedFile* import = FindScanned(builder, reader.String());
+      if (!import) return false;
+      file->imports.push_back(import);
+      file->importsIObject = file->importsIObject || import->importsIObject;
+    }
+    file->hasDeclarations = reader.Number(1) != 0;
+  }
+  reader.Registry(builder.registerMap);
+  reader.Registry(builder.unregisterMap);
+  return true;
+}
+
+bool LoadDependencyFile(ProjectBuilder& builder, const std::string& path) {
+  std::string payload;
+  if (!ReadCheckedFile(kMagic, payload, path)) return false;
+  bool loaded = false;
+  try {
+    loaded = ParseDependencyPayload(builder, payload);
+  } catch (const IException& exception) {
+    TraceWriter() << "*** Error reading " << path << " : " << exception << "\n";
+  }
+  builder.dependencyFileLoaded = loaded;
+  if (!loaded) {
+    builder.scanned.clear();
+    builder.scannedByPath.clear();
+    builder.registerMap.entries.clear();
+    builder.unregisterMap.entries.clear();
+  }
+  return loaded;
+}
+
+void SaveDependencyFile(ProjectBuilder& builder, const std::string& path) {
+  CreateDirectories(path, false);
+  try {
+    WriteCheckedFile(kMagic, DependencyPayload(builder), path);
+    builder.registerMap.dirty = builder.unregisterMap.dirty = false;
+  } catch (const FileException&) {
+    TraceWriter() << "*** Couldn't save dependency file " << path << "\n";
+  }
+}
+
+}  // namespace qrex

@@ -1,0 +1,204 @@
+#include "build/project_builder.h"
+
+#include <algorithm>
+
+#include "build/dependency_file.h"
+#include "build/staleness.h"
+#include "build/tools.h"
+#include "text/files.h"
+#include "text/output_policy.h"
+#include "text/paths.h"
+
+namespace qrex {
+
+std::string TranslationDirectory(const ProjectConfig& config) {
+  return "qrexsource/" + config.platform + "/" + config.name;
+}
+
+std::string DependencyFilePath(const Project& project, const ProjectConfig& config) {
+  return TranslationDirectory(config) + "/" + project.name + ".qrexdep";
+}
+
+ProjectBuilder::ProjectBuilder(ConfigSettings& settings, Project& project, ProjectConfig& config)
+    : settings(settings), project(project), config(config) {}
+
+ProjectBuilder::~ProjectBuilder() = default;
+
+ScannedFile& ProjectBuilder::GetScannedFile(ProjectFile& file) {
+  std::unique_ptr<ScannedFile>& slot = scannedByPath[file.path];
+  if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
+  return *slot;
+}
+
+bool ProjectBuilder::RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) {
+  const auto [entry, isNew] = m_guidOwners.emplace(id, owner);
+  if (!isNew) existingOwner = entry->second;
+  return isNew;
+}
+
+bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
+  if (!position) return false;
+  for (const auto& [name, file] : scannedByPath) {
+    const TextRange text{std::string_view(file->sourceText)};
+    if (!file->translated || !text.Contains(position)) continue;
+    path = file->SourcePath();
+    line = LineOfPosition(text, position);
+    return true;
+  }
+  return false;
+}
+
+std::string ProjectBuilder::TranslatedPath(const ProjectFile& file) const {
+  return PathJoin(TranslationDirectory(config), file.path);
+}
+
+std::string ProjectBuilder::IntermediateDirectory() const {
+  return config.platform + "/" + config.name + "/" + project.name;
+}
+
+std::string ProjectBuilder::LibraryDirectory() const {
+  return PathJoin3(settings.exportLib, config.platform, config.name);
+}
+
+void ProjectBuilder::WriteHeading(std::string_view end) const {
+  TraceWriter() << "\n------------------------------------- " << project.name << "  [" << config.name << "|"
+                << config.platform << "] ------------------------------------------" << end;
+}
+
+bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile* singleFile) {
+  const bool isBuild = settings.mode == RunMode::Build;
+  if (!settings.translateOnly && settings.Environment()) ApplyEnvironment(*settings.Environment());
+  WriteHeading("\n");
+  if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
+  PrepareFiles(dependencyFile);
+  bool result = true;
+  try {
+    result = ProcessFiles(singleFile);
+    if (!project.exported && isBuild) {
+      ReportUnregistered();
+      if (!settings.translateOnly && result) result = LinkIfStale();
+    }
+  } catch (const LexScannerException&) {
+    Save(dependencyFile);
+    throw;
+  }
+  Save(dependencyFile);
+  return result;
+}
+
+void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
+  project.CollectFiles();
+  if (settings.rebuildAll) {
+    DeleteReporting(dependencyFile);
+  } else if (!LoadDependencyFile(*this, dependencyFile) && settings.diagnostics) {
+    TraceWriter() << "No dependency file " << dependencyFile << "\n";
+  }
+  if (!settings.translateOnly) CreateDirectories(IntermediateDirectory(), true);
+  for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
+  for (ScannedFile* file : scanned) {
+    file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
+    if (file->needsWriting && settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
+  }
+}
+
+bool ProjectBuilder::ProcessFiles(const ProjectFile* singleFile) {
+  bool result = true;
+  for (ScannedFile* file : scanned) {
+    if (!ProcessFile(*file, singleFile)) result = false;
+  }
+  return result;
+}
+
+bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
+  const FileKind kind = file.file.kind;
+  const bool isBuild = settings.mode == RunMode::Build;
+  const bool isWanted = isBuild || &file.file == singleFile;
+  const bool runsTools = !project.exported && !settings.translateOnly;
+  bool result = true;
+  if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
+  if (file.needsWriting && (kind == FileKind::H || (isWanted && !project.exported))) file.WriteGeneratedFile();
+  if (runsTools && isBuild && IsVisualCpp(settings.compiler) && settings.compiler != CompilerKind::vc6 &&
+      kind == FileKind::Rc) {
+    result = CompileResourceIfStale(file);
+  }
+  const bool isSource = kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::Asm;
+  if (runsTools && isSource && isWanted) result = CompileIfStale(file);
+  if (kind == FileKind::Cpp && !file.translated) MarkRegistered(file);
+  return result;
+}
+
+bool ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
+  if (LastWriteTime(file.SourcePath()) < LastWriteTime(ResourceObjectPath(*this, file.file))) return true;
+  return CompileResource(*this, file);
+}
+
+bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
+  if (LatestTargetTime(*this, file) < LastWriteTime(ObjectPath(*this, file.file))) return true;
+  file.WriteGeneratedFile();
+  return file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
+}
+
+void ProjectBuilder::ReportUnregistered() const {
+  for (const ScannedFile* file : scanned) {
+    if (!file->hasDeclarations || file->registered) continue;
+    TraceWriter() << file->SourcePath() << "(1) : error : No cpp directly imports " << file->file.name
+                  << " - declarations not registered\n";
+  }
+}
+
+bool ProjectBuilder::LinkIfStale() {
+  const std::string target = TargetPath(*this);
+  const std::vector<std::string> inputs = CollectLinkInputs(*this);
+  const int64_t targetTime = LastWriteTime(target);
+  const bool isCurrent = targetTime != 0 && std::none_of(inputs.begin(), inputs.end(), [&](const std::string& input) {
+                           return LastWriteTime(input) > targetTime;
+                         });
+  if (isCurrent) return true;
+  if (!LinkTarget(*this, target, inputs)) return false;
+  if (settings.compiler == CompilerKind::vc6 || IsGccFamily(settings.compiler)) return true;
+  return EmbedManifest(*this, target);
+}
+
+// A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
+void ProjectBuilder::Save(const std::string& dependencyFile) {
+  if (registerMap.dirty || unregisterMap.dirty) {
+    for (ScannedFile* file : scanned) {
+      if (file->file.isMainSource && (!file->translated || file->needsWriting)) file->translationTime = 0;
+    }
+  }
+  SaveDependencyFile(*this, dependencyFile);
+}
+
+void ProjectBuilder::Clean(const std::string& dependencyFile) {
+  WriteHeading("\n");
+  project.CollectFiles();
+  DeleteReporting(dependencyFile);
+  for (const ProjectFile* file : project.files) DeleteReporting(TranslatedPath(*file));
+}
+
+namespace {
+
+void ExportFolder(Project& project, const ProjectConfig& config, const ProjectFolder& folder) {
+  const ConfigSettings& settings = *project.settings;
+  const bool readOnly = settings.makeExportedHeaderFilesReadOnly;
+  for (const ProjectFile* file : folder.files) {
+    if (file->excluded) continue;
+    const std::string source = project.SourcePath(*file);
+    const std::string translated = project.usesQrex ? PathJoin(TranslationDirectory(config), file->path) : source;
+    CopyIfNewer(translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
+    CopyIfNewer(source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
+  }
+  for (const auto& subfolder : folder.subfolders) {
+    if (&folder == &project.rootFolder && subfolder->name == "src") continue;
+    ExportFolder(project, config, *subfolder);
+  }
+}
+
+}  // namespace
+
+void ExportPublicHeaders(Project& project, ProjectConfig& config) {
+  project.CollectFiles();
+  ExportFolder(project, config, project.rootFolder);
+}
+
+}  // namespace qrex

@@ -1,0 +1,18 @@
+// What must be translated again. Times are file times; 0 means that the file does not exist.
+#pragma once
+
+#include <cstdint>
+
+#include "build/project_builder.h"
+
+namespace qrex {
+
+// The latest write time of the file and all that it imports; 0 if one of them is missing. Kept in the ScannedFile.
+int64_t LatestSourceTime(ScannedFile& file);
+// The same over the translated files. Throws "Error - file not translated by qrex : ".
+int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file);
+bool NeedsTranslation(const ProjectBuilder& builder, ScannedFile& file);
+// Notes that a .cpp which was not translated in this run registers the headers of its project that it imports directly.
+void MarkRegistered(ScannedFile& file);
+
+}  // namespace qrex

@@ -1,0 +1,134 @@
+#include "build/tool_output.h"
+
+#include "text/files.h"
+#include "text/paths.h"
+
+namespace qrex {
+
+namespace {
+
+bool IsBlank(char c) { return c == ' ' || c == '\t'; }
+bool IsDigit(char c) { return c >= '0' && c <= '9'; }
+bool StandsInFileName(char c) { return std::string_view("\n\r\"*<>?|").find(c) == std::string_view::npos; }
+
+bool StartsWith(std::string_view text, std::string_view prefix) { return text.substr(0, prefix.size()) == prefix; }
+
+bool StripIgnoringCase(std::string& path, const std::string& prefix) {
+  if (!StartsWithIgnoringCase(path, prefix)) return false;
+  path.erase(0, prefix.size());
+  return true;
+}
+
+// A message in a line: where the file name ends, the number, and the text behind.
+struct Message {
+  std::string_view file;
+  int64_t line = 0;
+  std::string_view rest;
+  size_t end = 0;  // behind the number, where the walk goes on
+};
+
+class OutputScanner {
+ public:
+  explicit OutputScanner(ProjectBuilder& builder) : m_builder(builder) { FullPathOf(".", m_currentDirectory); }
+
+  bool Scan(std::string_view text) {
+    while (!text.empty()) {
+      const size_t end = std::min(text.find('\n'), text.size());
+      ScanLine(text.substr(0, end));
+      m_trace << text.substr(0, end) << (end < text.size() ? "\n" : "");
+      text.remove_prefix(std::min(end + 1, text.size()));
+    }
+    return m_result;
+  }
+
+ private:
+  void ScanLine(std::string_view line) {
+    const size_t begin = line.find_first_not_of(" \t\v\f\r");
+    if (begin == std::string_view::npos) return;
+    for (size_t at = begin; at < line.size() && StandsInFileName(line[at]);) {
+      Message message;
+      if (ReadMessage(line, begin, at, message)) {
+        Count(message.rest);
+        PointAtSource(line.substr(0, begin), message);
+        at = message.end;
+      } else {
+        ++at;
+      }
+    }
+  }
+
+  // Does the number of a message stand behind the `(` or `:` at `at`?
+  bool ReadMessage(std::string_view line, size_t begin, size_t at, Message& message) const {
+    const char opening = line[at];
+    const bool isColonForm = opening == ':' && IsGccFamily(m_builder.settings.compiler);
+    if (opening != '(' && !isColonForm) return false;
+    size_t next = at + 1;
+    while (next < line.size() && IsDigit(line[next]) && next - at < 18)
+      message.line = message.line * 10 + (line[next++] - '0');
+    if (next == at + 1) return false;
+    message.file = line.substr(begin, at - begin);
+    auto skipBlanks = [&] {
+      while (next < line.size() && IsBlank(line[next])) ++next;
+    };
+    auto take = [&](char c) { return next < line.size() && line[next] == c && ++next > 0; };
+    if (isColonForm) {
+      if (!take(':')) return false;
+      size_t column = next;
+      while (column < line.size() && IsDigit(line[column])) ++column;
+      if (column > next && column < line.size() && line[column] == ':') next = column + 1;
+      skipBlanks();
+      message.rest = line.substr(next);
+      if (StartsWith(message.rest, "fatal error")) message.rest.remove_prefix(6);
+      if (!StartsWith(message.rest, "error") && !StartsWith(message.rest, "warning")) return false;
+    } else {
+      if (!take(')')) return false;
+      skipBlanks();
+      if (!take(':')) return false;
+      skipBlanks();
+      message.rest = line.substr(next);
+    }
+    message.end = next;
+    return true;
+  }
+
+  void Count(std::string_view rest) {
+    if (StartsWith(rest, "error")) {
+      ++m_builder.errorCount;
+      m_result = false;
+    } else if (StartsWith(rest, "warn")) {
+      ++m_builder.warningCount;
+    }
+  }
+
+  void PointAtSource(std::string_view indentation, const Message& message) {
+    std::string file = NormaliseSlashes(message.file);
+    StripIgnoringCase(file, m_currentDirectory + "/");
+    StripIgnoringCase(file, "./");
+    if (!StripIgnoringCase(file, TranslationDirectory(m_builder.config))) return;
+    if (!file.empty() && file.front() == '/') file.erase(0, 1);
+    auto found = m_builder.scannedByPath.find(file);
+    std::string path;
+    int64_t line;
+    if (found == m_builder.scannedByPath.end() || !found->second->MapGeneratedLine(message.line, path, line)) return;
+    m_trace << indentation << path << "(" << line << ") ...\n";
+  }
+
+  static std::string NormaliseSlashes(std::string_view path) {
+    std::string normal(path);
+    for (char& c : normal) {
+      if (c == '\\') c = '/';
+    }
+    return normal;
+  }
+
+  ProjectBuilder& m_builder;
+  std::string m_currentDirectory;
+  TraceWriter m_trace;
+  bool m_result = true;
+};
+
+}  // namespace
+
+bool ScanToolOutput(ProjectBuilder& builder, std::string_view text) { return OutputScanner(builder).Scan(text); }
+
+}  // namespace qrex
