@@ -41,6 +41,7 @@ void ReportNoInterpreter() {
 bool RunCommand(const std::string& command, int& returnCode, const CommandOptions& options) {
   std::string line = command;
   if (options.output) line += std::string(" 1>") + kOutputFile;
+  if (options.errorsIntoOutput) line += " 2>&1";
   if (options.errors) line += std::string(" 2>") + kErrorFile;
   if (options.echo) TraceWriter() << line << "\n";
   auto writeCommand = [&] {

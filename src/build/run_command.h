@@ -9,6 +9,7 @@ struct CommandOptions {
   bool echo = false;
   std::string* output = nullptr;  // where the captured standard output goes; null: not captured
   std::string* errors = nullptr;
+  bool errorsIntoOutput = false;   // the error stream joins the captured output
   bool failOnNonZero = false;
   bool failOnErrorText = false;
 };

@@ -69,9 +69,8 @@ bool RunOnResponseFile(ProjectBuilder& builder, const std::string& responseFile,
   options.echo = echo;
   options.output = &output;
   int returnCode = 0;
-  // The gcc family writes its messages to the error stream: both go through one capture.
-  const std::string line = command + " @\"" + responseFile + "\"";
-  const bool ran = RunCommand(isGcc ? line + " 2>&1" : line, returnCode, options);
+  options.errorsIntoOutput = isGcc;  // where that family writes its messages
+  const bool ran = RunCommand(command + " @\"" + responseFile + "\"", returnCode, options);
   DeleteFile(responseFile);
   if (!ran) {
     TraceWriter() << responseFile << ": " << text << "\n";

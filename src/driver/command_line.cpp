@@ -1,0 +1,141 @@
+#include "driver/command_line.h"
+
+#include "driver/config_parser.h"
+#include "driver/run_workspace.h"
+#include "lex/literals.h"
+#include "platform/system.h"
+#include "text/paths.h"
+#include "text/scope_timer.h"
+#include "text/trace.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr char kBanner[] = "Qrex V2.20 Oct  7 2020\n";
+constexpr char kUsage[] = "Usage...\nQrex pathToConfigFile\n";
+
+void WriteArgument(size_t index, const std::string& argument, const std::string& remark = {}) {
+  WriteToConsole("argv[" + std::to_string(index) + "] = " + argument + remark + "\n");
+}
+
+// name="value" or name='value'. Only the first three tokens are looked at.
+bool ReadAssignment(const std::string& argument, std::string& name, std::string& value) {
+  LexScanner scanner{std::string_view(argument)};
+  try {
+    const LexToken nameToken = NextToken(scanner);
+    if (nameToken.kind != kIdentifier || NextToken(scanner).kind != kAssign) return false;
+    const LexToken token = NextToken(scanner);
+    if (token.kind != kSingleQuoted && token.kind != kDoubleQuoted) return false;
+    name = nameToken.text.Text();
+    DecodeString(token, value);
+    return true;
+  } catch (const LexScannerException&) {
+    return false;  // no assignment: the argument is the configuration
+  }
+}
+
+class CommandLine {
+ public:
+  explicit CommandLine(const std::vector<std::string>& arguments) : m_arguments(arguments) {}
+  int Run();
+
+ private:
+  size_t ReadAssignments();
+  void ReadConfigurationPath(const std::string& argument);
+  void RunParallelBuild();
+
+  const std::vector<std::string>& m_arguments;
+  ConfigSettings m_settings;
+  std::string m_configPath;
+  std::string m_solution;  // as typed, without the leading `*`
+  bool m_parallelBuild = false;
+};
+
+// The index of the first argument that is no assignment.
+size_t CommandLine::ReadAssignments() {
+  size_t index = 1;
+  for (std::string name, value; index < m_arguments.size(); ++index) {
+    if (!ReadAssignment(m_arguments[index], name, value)) break;
+    WriteArgument(index, m_arguments[index], " --> adding variable $" + name + "=" + value);
+    m_settings.context.rootFrame.DefineSubstitution(name, value);
+  }
+  return index;
+}
+
+void CommandLine::ReadConfigurationPath(const std::string& argument) {
+  m_configPath = argument;
+  if (!HasExtension(argument, "sln")) return;
+  m_parallelBuild = argument.front() == '*';
+  m_solution = argument.substr(m_parallelBuild ? 1 : 0);
+  ReplaceExtension(m_solution, m_parallelBuild ? "translate.qrex" : "qrex", m_configPath);
+}
+
+// The IDE's own build of the generated solution. Its exit code does not reach the exit status.
+void CommandLine::RunParallelBuild() {
+  if (const PlatformEnvironment* environment = m_settings.Environment()) ApplyEnvironment(*environment);
+  std::string command;
+  if (m_settings.compiler >= CompilerKind::vc10) {
+    command = "MSBuild /verbosity:minimal /m /t:Build \"/p:Platform=" + m_settings.platform +
+              ";Configuration=" + m_settings.config + "\" build_" + m_solution;
+  } else {
+    command = "devenv build_" + m_solution + " /Build \"" + m_settings.config + "|" + m_settings.platform + "\"";
+  }
+  TraceWriter() << "\n" << command << "\n";
+  ScopeTimer timer;
+  const int result = platform::RunCommand(command);
+  if (result != 0) TraceWriter() << command << " failed with error code " << result << "\n";
+  timer.Stop();
+  timer.Label() << "Parallel build with devenv";
+}
+
+int CommandLine::Run() {
+  WriteToConsole(kBanner);
+  OpenTrace("stdout", false, false);
+  if (m_arguments.size() < 2) {
+    WriteToConsole(kUsage);
+    return 1;
+  }
+  WriteArgument(0, m_arguments[0]);
+  const size_t configIndex = ReadAssignments();
+  if (configIndex == m_arguments.size()) {
+    WriteToConsole(kUsage);
+    return 1;
+  }
+  WriteArgument(configIndex, m_arguments[configIndex]);
+  ReadConfigurationPath(m_arguments[configIndex]);
+  std::string extraConfigText;
+  for (size_t i = configIndex + 1; i < m_arguments.size(); ++i) {
+    WriteArgument(i, m_arguments[i]);
+    extraConfigText += m_arguments[i] + "\n";
+  }
+  if (!LoadConfiguration(m_settings, m_configPath, extraConfigText)) return 1;
+  const std::string problem = ValidateSettings(m_settings);
+  if (!problem.empty()) {
+    WriteToConsole(problem + "Error in config file " + m_configPath + "\n");
+    return 1;
+  }
+  if (const PlatformEnvironment* environment = m_settings.Environment()) {
+    WriteToConsole("PATH = " + environment->PATH + "\nINCLUDE = " + environment->INCLUDE +
+                   "\nLIB = " + environment->LIB + "\n");
+  }
+  if (!RunWorkspace(m_settings)) return 1;
+  if (m_parallelBuild) RunParallelBuild();
+  CloseTrace();
+  return 0;
+}
+
+}  // namespace
+
+int RunCommandLine(const std::vector<std::string>& arguments) {
+  try {
+    return CommandLine(arguments).Run();
+  } catch (const IException& exception) {
+    TraceWriter() << exception << "\n";
+  } catch (const std::exception& exception) {
+    TraceWriter() << exception.what() << "\n";
+  }
+  return 1;
+}
+
+}  // namespace qrex

@@ -1,0 +1,281 @@
+#include "driver/config_parser.h"
+
+#include "lex/literals.h"
+#include "text/paths.h"
+
+namespace qrex {
+
+namespace {
+
+struct StringKey {
+  std::string_view word;
+  std::string ConfigSettings::*field;
+};
+constexpr StringKey kStringKeys[] = {
+    {"config", &ConfigSettings::config},
+    {"platform", &ConfigSettings::platform},
+    {"systemName", &ConfigSettings::systemName},
+    {"systemProcessor", &ConfigSettings::systemProcessor},
+    {"systemVersion", &ConfigSettings::systemVersion},
+    {"sizeofPointer", &ConfigSettings::sizeofPointer},
+};
+
+struct BoolKey {
+  std::string_view word;
+  bool ConfigSettings::*field;
+};
+constexpr BoolKey kBoolKeys[] = {
+    {"targetXP", &ConfigSettings::targetXP},
+    {"defaultToDll", &ConfigSettings::defaultToDll},
+    {"diagnostics", &ConfigSettings::diagnostics},
+    {"translateOnly", &ConfigSettings::translateOnly},
+    {"rebuildAll", &ConfigSettings::rebuildAll},
+    {"exportPublicHeaders", &ConfigSettings::exportPublicHeaders},
+    {"repackageExecutableTargets", &ConfigSettings::repackageExecutableTargets},
+    {"solutionContainsPrepackagedProjects", &ConfigSettings::solutionContainsPrepackagedProjects},
+    {"makeTranslatedFilesReadOnly", &ConfigSettings::makeTranslatedFilesReadOnly},
+    {"makeExportedHeaderFilesReadOnly", &ConfigSettings::makeExportedHeaderFilesReadOnly},
+    {"writeTokenEquivalent", &ConfigSettings::writeTokenEquivalent},
+};
+
+struct ListKey {
+  std::string_view word;
+  std::vector<std::string> ConfigSettings::*field;
+};
+constexpr ListKey kListKeys[] = {
+    {"virtualTree", &ConfigSettings::virtualTree},
+    {"workspaces", &ConfigSettings::workspaces},
+};
+
+struct EnvironmentKey {
+  std::string_view word;
+  std::string PlatformEnvironment::*field;
+};
+constexpr EnvironmentKey kEnvironmentKeys[] = {
+    {"PATH", &PlatformEnvironment::PATH},
+    {"INCLUDE", &PlatformEnvironment::INCLUDE},
+    {"LIB", &PlatformEnvironment::LIB},
+};
+
+struct PathVariable {
+  std::string_view name;
+  std::string ConfigSettings::*field;
+};
+constexpr PathVariable kPathVariables[] = {
+    {"EXPORT_LIB", &ConfigSettings::exportLib},
+    {"EXPORT_TRANSLATED_INCLUDE", &ConfigSettings::exportTranslatedInclude},
+    {"EXPORT_UNTRANSLATED_INCLUDE", &ConfigSettings::exportUntranslatedInclude},
+};
+
+constexpr std::string_view kModes[] = {"clean", "compile", "build", "gen", "show"};
+
+template <typename Row, size_t n>
+const Row* FindRow(const Row (&rows)[n], const LexToken& token) {
+  for (const Row& row : rows) {
+    if (token.Is(row.word)) return &row;
+  }
+  return nullptr;
+}
+
+class ConfigParser : public MpfwParser {
+ public:
+  explicit ConfigParser(ConfigSettings& settings) : MpfwParser(settings.context), m_settings(settings) {}
+
+  bool ResolveImport(const std::string& path, std::string& found) override {
+    return FindImport(m_settings, path, found);
+  }
+  void OnImportedFile(MpfwSourceFile& file) override {
+    ConfigParser parser(m_settings);
+    ParseImported(file, parser, [](MpfwParser& imported) { static_cast<ConfigParser&>(imported).ParseStatements(); });
+  }
+
+  void ParseStatements() {
+    while (current.kind != kEndOfText) ParseStatement();
+  }
+
+ private:
+  void ParseStatement();
+  void ParseVariable();
+  void ParseEnvironment(std::string PlatformEnvironment::*field);
+  void ParseList(std::vector<std::string>& list);
+  bool ReadAssignment();  // `=` or `+=`; true: the list starts anew
+  std::string ReadWord();
+  void SplitTargetDirectory(const std::string& path);
+
+  ConfigSettings& m_settings;
+};
+
+void ConfigParser::ParseStatement() {
+  if (ParseImportStatement()) return;
+  if (current.Is("compiler") || current.Is("mode")) {
+    const bool isMode = current.Is("mode");
+    Advance();
+    Expect(kAssign, "=");
+    const LexToken token = current;
+    const std::string word = ReadWord();
+    if (isMode) {
+      for (size_t i = 0; i < std::size(kModes); ++i) {
+        if (word != kModes[i]) continue;
+        m_settings.mode = static_cast<RunMode>(i);
+        return;
+      }
+    } else {
+      for (int i = 0; i <= static_cast<int>(CompilerKind::clang); ++i) {
+        if (word != CompilerKeyword(static_cast<CompilerKind>(i))) continue;
+        m_settings.compiler = static_cast<CompilerKind>(i);
+        return;
+      }
+    }
+    throw LexScannerException("Invalid option : " + Printed(token), token);
+  }
+  if (current.kind == kDollar) return ParseVariable();
+  if (const EnvironmentKey* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
+  if (const ListKey* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
+  if (const StringKey* key = FindRow(kStringKeys, current)) {
+    Advance();
+    Expect(kAssign, "=");
+    return ReadStringOrExpression(m_settings.*key->field);
+  }
+  if (const BoolKey* key = FindRow(kBoolKeys, current)) {
+    Advance();
+    Expect(kAssign, "=");
+    std::string word = current.text.Text();
+    SubstituteVariables(word);
+    if (word != "true" && word != "false") FailExpected("false/true");
+    m_settings.*key->field = word == "true";
+    return Advance();
+  }
+  throw LexScannerException("Syntax error: " + Printed(current), current);
+}
+
+std::string ConfigParser::ReadWord() {
+  std::string word = current.text.Text();
+  SubstituteVariables(word);
+  Advance();
+  return word;
+}
+
+void ConfigParser::ParseVariable() {
+  std::string name, value;
+  ParseVariableStatement(&name, &value);
+  TraceWriter() << "$" << name << " = " << value << "\n";
+  for (const PathVariable& variable : kPathVariables) {
+    if (name == variable.name) m_settings.*variable.field = value;
+  }
+  if (name == "COMPILE_FILE_PATH") m_settings.compileFilePath = NormalisePath(value);
+  if (name == "TARGET_DIR" && !value.empty()) SplitTargetDirectory(NormalisePath(value));
+}
+
+// The last two components of the path are the platform and the configuration; a path with fewer changes nothing.
+void ConfigParser::SplitTargetDirectory(const std::string& path) {
+  const size_t last = path.rfind('/');
+  if (last == std::string::npos || last == 0) return;
+  const size_t before = path.rfind('/', last - 1);
+  if (before == std::string::npos) return;
+  m_settings.config = path.substr(last + 1);
+  m_settings.platform = path.substr(before + 1, last - before - 1);
+}
+
+bool ConfigParser::ReadAssignment() {
+  const bool appends = current.kind == kPlusAssign;
+  if (appends) {
+    Advance();
+  } else {
+    Expect(kAssign, "=");
+  }
+  Expect(kOpenBrace, "{");
+  return !appends;
+}
+
+void ConfigParser::ParseEnvironment(std::string PlatformEnvironment::*field) {
+  Advance();
+  Expect(kOpenParen, "(");
+  if (current.kind != kDoubleQuoted) FailExpected("double quoted string");
+  std::string platform;
+  ReadString(platform);
+  Advance();
+  Expect(kCloseParen, ")");
+  const bool startsAnew = ReadAssignment();
+  std::string& list = m_settings.platformEnvironments[platform].*field;
+  if (startsAnew) list.clear();
+  while (current.kind != kCloseBrace) {
+    std::string entry;
+    ReadStringOrExpression(entry);
+    if (!list.empty()) list += ';';
+    list += entry;
+  }
+  Advance();
+}
+
+void ConfigParser::ParseList(std::vector<std::string>& list) {
+  Advance();
+  if (ReadAssignment()) list.clear();
+  while (current.kind != kCloseBrace) {
+    std::string entry;
+    ReadStringOrExpression(entry);
+    list.push_back(std::move(entry));
+  }
+  Advance();
+}
+
+}  // namespace
+
+bool LoadConfiguration(ConfigSettings& settings, const std::string& path, const std::string& extraText) {
+  ConfigParser parser(settings);
+  MpfwSourceFile* file = nullptr;
+  try {
+    file = parser.LoadSourceFile(path, extraText);
+  } catch (const LexScannerException& exception) {
+    TraceWriter() << "Exception: " << exception.message << "\n";
+    return false;
+  } catch (const IException& exception) {
+    TraceWriter() << "Exception: " << exception << "\n";
+    return false;
+  }
+  if (!file) {
+    TraceWriter() << "    while processing qrex config file : " << path << "\n";
+    return false;
+  }
+  const TextRange expansion{std::string_view(file->expansion)};
+  try {
+    parser.SetInput(expansion);
+    parser.ParseStatements();
+    return true;
+  } catch (LexScannerException& exception) {
+    MapErrorPosition(file->map, expansion, exception);
+    TraceWriter trace;
+    ReportParseError(settings.sourceFiles, trace, exception);
+    return false;
+  }
+}
+
+std::string ValidateSettings(const ConfigSettings& settings) {
+  auto missing = [](std::string_view what) {
+    return "\nERROR:  Missing setting: " + std::string(what) + " not specified\n";
+  };
+  if (settings.virtualTree.empty()) return missing("'virtualTree'");
+  if (settings.exportLib.empty()) return missing("$EXPORT_LIB");
+  if (settings.exportTranslatedInclude.empty()) return missing("$EXPORT_TRANSLATED_INCLUDE");
+  if (settings.exportUntranslatedInclude.empty()) return missing("$EXPORT_UNTRANSLATED_INCLUDE");
+  if (settings.exportTranslatedInclude == settings.exportUntranslatedInclude) {
+    return "\nERROR:  $EXPORT_TRANSLATED_INCLUDE and $EXPORT_UNTRANSLATED_INCLUDE both equal " +
+           settings.exportTranslatedInclude + "\n";
+  }
+  if (settings.workspaces.empty()) return missing("'workspace'");
+  if (settings.mode == RunMode::Gen) return {};
+  if (settings.config.empty()) return missing("'config'");
+  if (settings.platform.empty()) return missing("'platform'");
+  const bool runsTools =
+      settings.mode == RunMode::Compile || (settings.mode == RunMode::Build && !settings.translateOnly);
+  if (!runsTools) return {};
+  const PlatformEnvironment* environment = settings.Environment();
+  if (!environment) return "\nERROR:  PATH, INCLUDE, LIB not set for platform " + settings.platform + "\n";
+  for (const EnvironmentKey& key : kEnvironmentKeys) {
+    if (!(environment->*key.field).empty()) continue;
+    return "\nERROR:  " + std::string(key.word) + " not specified for platform " + settings.platform + "\n";
+  }
+  if (settings.mode == RunMode::Compile && settings.compileFilePath.empty()) return missing("'COMPILE_FILE_PATH'");
+  return {};
+}
+
+}  // namespace qrex

@@ -1,0 +1,19 @@
+#include <string>
+#include <vector>
+
+#include "driver/command_line.h"
+#include "platform/system.h"
+
+namespace {
+
+// Holds the deepest nesting that the languages permit; memory is used as it grows.
+constexpr size_t kStackSize = size_t{1} << 30;
+
+}  // namespace
+
+int main(int argc, char** argv) {
+  const std::vector<std::string> arguments(argv, argv + argc);
+  int status = 1;
+  qrex::platform::RunOnStack(kStackSize, [&] { status = qrex::RunCommandLine(arguments); });
+  return status;
+}

@@ -1,0 +1,371 @@
+#include "driver/run_workspace.h"
+
+#include "build/project_builder.h"
+#include "generators/exported_project.h"
+#include "generators/generate.h"
+#include "text/files.h"
+#include "text/output_policy.h"
+#include "text/paths.h"
+#include "text/scope_timer.h"
+#include "text/trace.h"
+#include "workspace/workspace.h"
+#include "workspace/workspace_parser.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr char kMarkerFile[] = ".qrwsroot";
+
+class WorkspaceRun {
+ public:
+  explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
+  bool LoadAll();
+  bool Run(ScopeTimer& timer);
+
+ private:
+  bool LoadWorkspaceFile(const std::string& entry);
+  bool RunProjects(ScopeTimer& timer);
+  bool ProcessProject(Project& project);
+  void MakeDirectories(const Project& project) const;
+  void CreateMissingFiles(Project& project) const;
+  void Repackage(const Project& project) const;
+  bool ProcessTranslated(Project& project);
+  bool BuildProject(Project& project);
+  void GenerateWorkspace();
+  ProjectFile* FindCompileFile(bool& found);
+  bool CompileOneFile(ScopeTimer& timer);
+  bool ShowGeneratedFile();
+  ProjectConfig* FindProjectConfig(const Project& project) const;
+
+  ConfigSettings& m_settings;
+  Workspace m_workspace;
+  int64_t m_errors = 0;
+  int64_t m_warnings = 0;
+  bool m_anyTranslated = false;
+};
+
+std::string PrintedList(const std::vector<std::string>& entries) {
+  std::string text = "[";
+  for (size_t i = 0; i < entries.size(); ++i) text += (i > 0 ? "," : "") + entries[i];
+  return text + "]\n";
+}
+
+void WriteOpening(const ConfigSettings& settings) {
+  const std::string list = PrintedList(settings.workspaces);
+  switch (settings.mode) {
+    case RunMode::Clean:
+      TraceWriter() << "Cleaning workspace " << list;
+      break;
+    case RunMode::Compile:
+      TraceWriter() << "Compiling file " << settings.compileFilePath << "...\n";
+      break;
+    case RunMode::Build:
+      TraceWriter() << "Building workspace " << list;
+      break;
+    case RunMode::Gen:
+      TraceWriter() << "Generating workspace " << list;
+      break;
+    case RunMode::Show:
+      TraceWriter() << "Showing generated file in workspace " << list;
+      break;
+  }
+}
+
+// --- Loading
+
+bool WorkspaceRun::LoadAll() {
+  for (std::string& entry : m_settings.workspaces) {
+    if (HasExtension(entry, "qrws")) {
+      if (!LoadWorkspaceFile(entry)) return false;
+    } else {
+      entry = ProjectPathOf(entry);
+      m_workspace.LoadProject(entry);  // a project that fails has printed its message; the run goes on with it empty
+    }
+  }
+  return m_workspace.CheckFileReferences();
+}
+
+bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
+  std::string fullPath;
+  if (!FindInTree(m_settings, entry, m_workspace.rootDir, fullPath)) {
+    TraceWriter() << "Error: Couldn't open workspace file " << entry << "\n";
+    return false;
+  }
+  CopyIfNewer(fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
+  const size_t slash = entry.rfind('/');
+  m_workspace.relativeDir = slash == std::string::npos ? std::string() : entry.substr(0, slash);
+  WorkspaceParser parser(m_workspace);
+  MpfwSourceFile* file = parser.LoadSourceFile(fullPath);
+  if (!file) {
+    TraceWriter() << "Error in workspace file " << fullPath << "\n";
+    return false;
+  }
+  const TextRange expansion{std::string_view(file->expansion)};
+  try {
+    parser.SetInput(expansion);
+    m_workspace.name = parser.ParseWorkspace();
+    return true;
+  } catch (LexScannerException& exception) {
+    MapErrorPosition(file->map, expansion, exception);
+    TraceWriter trace;
+    ReportParseError(m_settings.sourceFiles, trace, exception);
+    return false;
+  }
+}
+
+// --- Projects
+
+bool WorkspaceRun::Run(ScopeTimer& timer) {
+  switch (m_settings.mode) {
+    case RunMode::Compile:
+      return CompileOneFile(timer);
+    case RunMode::Show:
+      return ShowGeneratedFile();
+    default:
+      return RunProjects(timer);
+  }
+}
+
+bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
+  m_workspace.SortProjects();
+  if (m_settings.compiler != CompilerKind::vc6) m_workspace.SyncProjectGuids();
+  if (m_settings.mode == RunMode::Gen) {
+    MemoryTextWriter names;
+    for (const auto& project : m_workspace.projects) {
+      if (project != m_workspace.projects.front()) names << " ";
+      names << project->name;
+    }
+    WriteIfChanged(names, m_workspace.name + ".projects");
+  }
+  for (const auto& project : m_workspace.projects) {
+    if (!ProcessProject(*project)) return false;
+  }
+  if (m_settings.mode == RunMode::Gen) GenerateWorkspace();
+  TraceWriter() << "\n";
+  timer.Stop();
+  timer.Label() << "Completed";
+  if (m_warnings > 0 || m_errors > 0) {
+    timer.Label() << " with " << m_warnings << " warnings, " << m_errors << " errors";
+  }
+  return true;
+}
+
+bool WorkspaceRun::ProcessProject(Project& project) {
+  MakeDirectories(project);
+  CopyIfNewer(PathJoin(project.rootDir, kMarkerFile), m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false);
+  if (m_settings.mode == RunMode::Gen) {
+    project.CollectFiles();
+    if (!project.exported) CreateMissingFiles(project);
+    GenerateProjectFile(project, false);
+  }
+  if (m_settings.mode != RunMode::Clean) {
+    if (!project.exported) WriteExportedProject(project);
+    if (m_settings.mode == RunMode::Build) Repackage(project);
+  }
+  if (project.usesQrex) {
+    m_anyTranslated = true;
+    if (!ProcessTranslated(project)) return false;
+  }
+  if (!project.exported && m_settings.exportPublicHeaders && m_settings.mode == RunMode::Build) {
+    ProjectConfig* config = FindProjectConfig(project);
+    if (!config) return false;
+    ExportPublicHeaders(project, *config);
+  }
+  return true;
+}
+
+void WorkspaceRun::MakeDirectories(const Project& project) const {
+  for (const auto& config : project.configs) {
+    if (!m_settings.translateOnly) {
+      CreateDirectories(config->platform + "/" + config->name + "/" + project.name, true);
+    }
+    if (project.exported || !IsLibrary(project.targetType)) continue;
+    if (!m_settings.translateOnly) {
+      CreateDirectories(PathJoin3(m_settings.exportLib, config->platform, config->name), true);
+    }
+    CreateDirectories(m_settings.exportTranslatedInclude, true);
+    CreateDirectories(m_settings.exportUntranslatedInclude, true);
+  }
+}
+
+void WorkspaceRun::CreateMissingFiles(Project& project) const {
+  for (const ProjectFile* file : project.files) {
+    const std::string path = project.SourcePath(*file);
+    if (FileExists(path)) continue;
+    WriteToConsole("Creating missing file " + path + "\n");
+    if (!CreateEmptyFile(path, false)) WriteToConsole("Error creating " + path + "\n");
+  }
+}
+
+// The built target of a prepackaged project goes to the library directory.
+void WorkspaceRun::Repackage(const Project& project) const {
+  if (!m_settings.repackageExecutableTargets || !project.exported) return;
+  if (project.targetType == TargetType::UtilityProject) return;
+  const std::string target = m_settings.platform + "/" + m_settings.config + "/" + project.name + "." +
+                             std::string(TargetTypeExtension(project.targetType));
+  CopyIfNewer(PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
+}
+
+bool WorkspaceRun::ProcessTranslated(Project& project) {
+  if (m_settings.mode == RunMode::Gen) {
+    GenerateProjectFile(project, true);
+    return true;
+  }
+  if (project.exported && !IsLibrary(project.targetType)) return true;
+  return BuildProject(project);
+}
+
+ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
+  ProjectConfig* config = project.FindConfig(m_settings.config, m_settings.platform);
+  if (!config) {
+    TraceWriter() << "Error: There is no configuration " << m_settings.config << "|" << m_settings.platform
+                  << " in project " << project.name << "\n";
+  }
+  return config;
+}
+
+bool WorkspaceRun::BuildProject(Project& project) {
+  ProjectConfig* config = FindProjectConfig(project);
+  if (!config) return false;
+  try {
+    ProjectBuilder builder(m_settings, project, *config);
+    ScopeTimer timer;
+    const std::string dependencyFile = DependencyFilePath(project, *config);
+    bool succeeded = true;
+    try {
+      if (m_settings.mode == RunMode::Clean) {
+        builder.Clean(dependencyFile);
+      } else {
+        succeeded = builder.Build(dependencyFile, nullptr);
+      }
+    } catch (const LexScannerException& exception) {
+      TraceWriter() << "\n" << exception << "\n";
+      return false;
+    }
+    m_errors += builder.errorCount;
+    m_warnings += builder.warningCount;
+    if (succeeded) {
+      timer.Stop();
+      timer.Label() << project.name;
+    }
+    return true;
+  } catch (const FileException& exception) {
+    TraceWriter() << "Error: " << exception << "\n";
+    return false;
+  }
+}
+
+void WorkspaceRun::GenerateWorkspace() {
+  if (IsVisualCpp(m_settings.compiler) && !m_settings.platformEnvironments.empty()) {
+    ApplyEnvironment(m_settings.platformEnvironments.begin()->second);
+  }
+  GenerateWorkspaceFile(m_workspace, false);
+  if (m_anyTranslated) GenerateWorkspaceFile(m_workspace, true);
+}
+
+// --- One file
+
+ProjectFile* WorkspaceRun::FindCompileFile(bool& found) {
+  std::string root, relative;
+  found = FindWorkspaceRoot(m_settings.compileFilePath, root, relative);
+  if (!found) {
+    TraceWriter() << "Search for " << kMarkerFile << " failed\n";
+    return nullptr;
+  }
+  ProjectFile* file = m_workspace.FindFile(relative);
+  return file && file->project->usesQrex ? file : nullptr;
+}
+
+bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
+  bool found;
+  ProjectFile* file = FindCompileFile(found);
+  if (!found) return false;
+  auto abort = [](std::string_view why) {
+    TraceWriter() << "Compilation aborted: File is " << why << "\n";
+    return false;
+  };
+  if (!file) return abort("not part of an qrex project");
+  Project& project = *file->project;
+  if (project.exported) return abort("part of an exported project");
+  if (file->kind != FileKind::C && file->kind != FileKind::Cpp && file->kind != FileKind::Asm) {
+    return abort("not a cpp, c or asm file");
+  }
+  ProjectConfig* config = FindProjectConfig(project);
+  if (!config) return false;
+  ProjectBuilder builder(m_settings, project, *config);
+  DeleteReporting(builder.TranslatedPath(*file));
+  try {
+    builder.Build(DependencyFilePath(project, *config), file);
+  } catch (const LexScannerException& exception) {
+    TraceWriter() << "\n" << exception << "\n";
+    return false;
+  }
+  TraceWriter() << "\n";
+  timer.Stop();
+  timer.Label() << "Compile completed";
+  return true;
+}
+
+bool WorkspaceRun::ShowGeneratedFile() {
+  bool found;
+  const ProjectFile* file = FindCompileFile(found);
+  if (!found) return false;
+  if (!file) {
+    TraceWriter() << "File is not part of an qrex project\n";
+    return false;
+  }
+  const ProjectConfig* config = FindProjectConfig(*file->project);
+  if (!config) return false;
+  TraceWriter() << "\n" << PathJoin(TranslationDirectory(*config), file->path) << "(1)\n";
+  return true;
+}
+
+}  // namespace
+
+bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative) {
+  for (size_t slash = path.rfind('/'); slash != std::string::npos; slash = path.rfind('/', slash - 1)) {
+    if (FileExists(path.substr(0, slash) + "/" + kMarkerFile)) {
+      root = path.substr(0, slash);
+      relative = path.substr(slash + 1);
+      return true;
+    }
+    if (slash == 0) break;
+  }
+  return false;
+}
+
+bool CheckPathSyntax(const ConfigSettings& settings) {
+  auto check = [](const std::string& path) {
+    if (path.find('\\') != std::string::npos) {
+      TraceWriter() << "Forward slashes must be used in argument " << path << "\n";
+      return false;
+    }
+    if (!path.empty() && path.back() == '/') {
+      TraceWriter() << "Path can't end with a trailing slash in argument " << path << "\n";
+      return false;
+    }
+    return true;
+  };
+  for (const std::string& root : settings.virtualTree) {
+    if (!check(root)) return false;
+  }
+  for (const std::string* path :
+       {&settings.exportLib, &settings.exportTranslatedInclude, &settings.exportUntranslatedInclude}) {
+    if (!check(*path)) return false;
+  }
+  for (const std::string& entry : settings.workspaces) {
+    if (!check(entry)) return false;
+  }
+  return true;
+}
+
+bool RunWorkspace(ConfigSettings& settings) {
+  ScopeTimer timer;
+  WriteOpening(settings);
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings);
+  return run.LoadAll() && run.Run(timer);
+}
+
+}  // namespace qrex

@@ -1,0 +1,18 @@
+// The road of a whole run: loads what the settings name, checks it, and does what the mode says.
+#pragma once
+
+#include <string>
+
+#include "driver/config_settings.h"
+
+namespace qrex {
+
+// False for a failure to load, a missing configuration or a translation error; a run that counted compile errors is
+// true.
+bool RunWorkspace(ConfigSettings& settings);
+
+// The deepest directory of the path that holds the marker, and the path relative to it.
+bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative);
+bool CheckPathSyntax(const ConfigSettings& settings);
+
+}  // namespace qrex
