@@ -131,7 +131,14 @@ class QrexParser : public ExpressionParser {
   void CloseBrace();
   void Dispatch();
   bool ParseDecoratorType(TypeCode& type, bool reflected);
-  void ParseSuffixedType(TypeCode& type, bool reflected);
+  bool ParseSuffixedType(TypeCode& type, bool reflected);
+  void ParseInnerType(TypeCode& type, bool reflected);
+  void ExpectCloseAngle();
+  void CheckPlatformDependent() const;
+  TypeCode ParseArraySuffix();
+  void ParseArguments(FunctionSignature& signature, bool directionsRequired, bool polymorphicAllowed, bool reflected);
+  void ParseSignatureEnd(FunctionSignature& signature, bool constAllowed);
+  size_t ParseMetadataValues(std::string& out, int32_t close, std::string_view expected, std::string_view exceeded);
 
   const char* m_copyPosition;
   std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
@@ -139,7 +146,6 @@ class QrexParser : public ExpressionParser {
   int64_t m_braceDepth = 0;
   WarningFlags m_warnings;
   std::vector<WarningFlags> m_savedWarnings;
-  int m_typeDepth = 0;
 };
 
 // Bounds the recursion of handlers that call each other for nested declarations, types or lists.

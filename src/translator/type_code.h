@@ -88,6 +88,9 @@ struct FunctionSignature {
   bool isConst = false;
 };
 
+std::string_view BuiltInTypeName(uint8_t op);   // of 0..17: "void", "int8", ...
+std::string_view TemplateTypeName(uint8_t op);  // of 64..73: "ptr", "xvector", ...
+
 // --- Building and walking. A view is the rest of a code; functions that move it take it by reference.
 void AppendNamedType(TypeCode& code, uint8_t op, std::string_view name);
 std::string_view SkipMetadata(std::string_view code);   // at the head of the code only
@@ -141,6 +144,13 @@ struct TypeContext {
   bool allowVoid = false;
 };
 bool CheckType(std::string_view code, NameSpace& root, TypeContext context, std::string& message);
+
+// What stands behind a typedef: TypedefDef derives from this as well.
+class TypedefTarget {
+ public:
+  virtual ~TypedefTarget() = default;
+  virtual const TypeCode& TargetType() const = 0;
+};
 
 // What IsSerialisable and the visit predicates ask of a class or variant: both derive from this as well.
 class TypeBehaviour {
