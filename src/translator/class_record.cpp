@@ -26,7 +26,6 @@ class ClassRecord {
   void WriteModelFields();
   void WriteMapOrSetFunctions(const ModelField& field);
   void WriteMethods();
-  void WriteMethodArrays(const FunctionSignature& method);
   void WriteMethodRow(const FunctionSignature& method);
   void WriteInterfaces();
   void WriteRecord();
@@ -110,21 +109,6 @@ void ClassRecord::WriteModelFields() {
   m_modelFieldCount = WriteModelFieldRows(m_out, m_def);
 }
 
-void ClassRecord::WriteMethodArrays(const FunctionSignature& method) {
-  const std::string prefix = m_name + "_" + method.name;
-  if (!method.metadata.empty()) WriteMetadataByteCode(m_out, prefix + "_metadata", m_strings, method.metadata);
-  if (!IsVoid(method.returnType)) WriteTypeByteCode(m_out, prefix + "_return", m_strings, method.returnType);
-  for (const FunctionArg& argument : method.arguments) {
-    WriteTypeByteCode(m_out, prefix + "_" + argument.name, m_strings, argument.type);
-  }
-  if (method.arguments.empty()) return;
-  m_out << "static const vesk::ReflectedArg " << prefix << "_args[] =\n";
-  Block rows(m_out, ";");
-  for (const FunctionArg& argument : method.arguments) {
-    WriteText(m_out, "{ \"$1\", $0_$1 },\n", {prefix, argument.name});
-  }
-}
-
 void ClassRecord::WriteMethodRow(const FunctionSignature& method) {
   const std::string prefix = m_name + "_" + method.name;
   m_out << "{\"" << method.name << "\",{";
@@ -143,7 +127,9 @@ void ClassRecord::WriteMethodRow(const FunctionSignature& method) {
 }
 
 void ClassRecord::WriteMethods() {
-  for (const FunctionSignature& method : m_def.m_methods) WriteMethodArrays(method);
+  for (const FunctionSignature& method : m_def.m_methods) {
+    WriteSignatureArrays(m_out, m_name + "_" + method.name, method, m_strings);
+  }
   if (m_def.m_methods.empty()) return;
   m_out << "static const vesk::ReflectedClassMethod " << m_name << "_methods[] =\n";
   Block rows(m_out, ";");

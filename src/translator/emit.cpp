@@ -80,6 +80,17 @@ void WriteReturn(TextWriter& out, const TypeCode& returnType) {
   if (!IsVoid(returnType)) out << "return ";
 }
 
+void WriteSignature(TextWriter& out, const FunctionSignature& signature) {
+  if (signature.isInline) out << "inline ";
+  PrintType(out, signature.returnType);
+  out << " " << signature.name << "(";
+  WriteList(out, signature.arguments, [&](const FunctionArg& argument) {
+    PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
+    if (!argument.defaultValue.empty()) out << "=" << argument.defaultValue;
+  });
+  out << (signature.isConst ? ") const" : ")");
+}
+
 void WriteNameOrZero(TextWriter& out, bool present, std::string_view name) {
   out << (present ? name : std::string_view("0")) << ",";
 }

@@ -50,6 +50,9 @@ void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, co
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "a,b"
 void WriteReturn(TextWriter& out, const TypeCode& returnType);                   // "return " unless void
 
+// "inline T name(T a=1,U b) const": a signature as C++.
+void WriteSignature(TextWriter& out, const FunctionSignature& signature);
+
 // Rows of records: "NAME," or "0,"; "NAME,count," or "0,0,".
 void WriteNameOrZero(TextWriter& out, bool present, std::string_view name);
 void WriteCountedName(TextWriter& out, size_t count, std::string_view name);

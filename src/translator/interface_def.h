@@ -39,6 +39,7 @@ class InterfaceDef : public NameSpaceElement {
     std::string path;
   };
   std::vector<FlatBase> FlattenedBases() const;
+  void AddFlattenedBases(std::vector<FlatBase>& flat, const std::string& path) const;
   bool InheritsFrom(std::string_view qualifiedName) const;  // is it, or has it among its bases
   bool SubtypesIObject() const { return InheritsFrom("vesk::IObject"); }
   size_t InheritedMethodCount() const;  // once per path

@@ -27,6 +27,21 @@ void WriteRegistration(TextWriter& out, const NameSpaceElement& element, Registr
       << "*) 0),vesk::" << TargetIdentifier(element) << "_GetXTarget()) == vesk::NSE_OK);\n";
 }
 
+void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const FunctionSignature& signature,
+                          StringTable& strings) {
+  if (!signature.metadata.empty()) WriteMetadataByteCode(out, prefix + "_metadata", strings, signature.metadata);
+  if (!IsVoid(signature.returnType)) WriteTypeByteCode(out, prefix + "_return", strings, signature.returnType);
+  for (const FunctionArg& argument : signature.arguments) {
+    WriteTypeByteCode(out, prefix + "_" + argument.name, strings, argument.type);
+  }
+  if (signature.arguments.empty()) return;
+  out << "static const vesk::ReflectedArg " << prefix << "_args[] =\n";
+  Block rows(out, ";");
+  for (const FunctionArg& argument : signature.arguments) {
+    WriteText(out, "{ \"$1\", $0_$1 },\n", {prefix, argument.name});
+  }
+}
+
 void NameSpaceElement::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   if (!HaveSomethingToRegister() || !HasRecord()) return;
   WriteReflectionHead(out, *this);

@@ -18,6 +18,10 @@ class QrexParser;
 void WriteReflectionHead(TextWriter& out, const NameSpaceElement& element);  // "\n//### ..." and the target declaration
 void WriteRegistration(TextWriter& out, const NameSpaceElement& element, RegistrationLists& lists);  // if m_registered
 
+// The byte code arrays of a signature, PREFIX_metadata, PREFIX_return, PREFIX_arg each, and the table PREFIX_args.
+void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const FunctionSignature& signature,
+                          StringTable& strings);
+
 // --- At the place of a declaration: closes the open name spaces, writes the TypeTraits block, reopens them.
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element);
 

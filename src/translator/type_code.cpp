@@ -8,7 +8,6 @@ namespace {
 
 uint8_t Op(std::string_view code) { return code.empty() ? 0 : static_cast<uint8_t>(code.front()); }
 bool IsNamed(uint8_t op) { return op >= kOpClass && op <= kOpCppText; }
-bool IsDecorator(uint8_t op) { return op >= kOpVolatile && op <= kOpOffsettable; }
 bool IsTemplate(uint8_t op) { return op >= kOpPtr && op <= kOpDynArray; }
 bool IsMetadata(uint8_t op) { return op >= 160; }
 
