@@ -1,0 +1,1 @@
+@import "api/error_codes.h"
