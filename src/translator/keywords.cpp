@@ -1,11 +1,16 @@
 #include "translator/keywords.h"
 
+#include "translator/class_members.h"
 #include "translator/class_parser.h"
+#include "translator/enum_def.h"
+#include "translator/functor_def.h"
+#include "translator/global_defs.h"
 #include "translator/interface_def.h"
 #include "translator/mixin_list.h"
 #include "translator/model.h"
 #include "translator/qrex_parser.h"
 #include "translator/records.h"
+#include "translator/variant_def.h"
 
 namespace qrex {
 
@@ -29,13 +34,22 @@ void ParseModelInBody(QrexParser& parser, ClassDef& def) {
 }
 
 constexpr Keyword kKeywords[] = {
+    {"enum", [](QrexParser& parser) { ParseEnum(parser, nullptr); }},
+    {"variant", [](QrexParser& parser) { ParseVariant(parser, nullptr); }},
     {"type", ParseType},
+    {"typedef", ParseTypedef},
     {"interface", [](QrexParser& parser) { ParseInterface(parser, nullptr); }},
     {"struct", ParseFileClass<ClassKind::Struct>},
     {"class", ParseFileClass<ClassKind::Class>},
     {"adt", ParseFileClass<ClassKind::Adt>},
     {"mixin", ParseFileClass<ClassKind::Mixin>},
     {"model", ParseFileClass<ClassKind::Model>},
+    {"var", ParseGlobalVar},
+    {"function", [](QrexParser& parser) { ParseGlobalFunction(parser, false); }},
+    {"polymorphic", [](QrexParser& parser) { ParseGlobalFunction(parser, true); }},
+    {"functor", ParseFunctor},
+    {"makefunctor", ParseMakeFunctor},
+    {"makeconstfunctor", ParseMakeFunctor},
     {"new", ParseNew, true},
     {"warning", ParseWarning},
     {"init", ParseInit, true},
@@ -47,7 +61,17 @@ constexpr ClassKeyword kClassKeywords[] = {
     {"struct", ParseNestedClass<ClassKind::Struct>},
     {"mixin", ParseNestedClass<ClassKind::Mixin>},
     {"interface", [](QrexParser& parser, ClassDef& def) { ParseInterface(parser, &def); }},
+    {"enum", [](QrexParser& parser, ClassDef& def) { ParseEnum(parser, &def); }},
+    {"variant", [](QrexParser& parser, ClassDef& def) { ParseVariant(parser, &def); }},
     {"model", ParseModelInBody},
+    {"cache", ParseCache, true},
+    {"dep", ParseDep},
+    {"indep", ParseIndep},
+    {"evict", ParseEvict, true},
+    {"visit", ParseVisit, true},
+    {"functor", [](QrexParser& parser, ClassDef&) { ParseFunctor(parser); }},
+    {"makefunctor", [](QrexParser& parser, ClassDef&) { ParseMakeFunctor(parser); }},
+    {"makeconstfunctor", [](QrexParser& parser, ClassDef&) { ParseMakeFunctor(parser); }},
     {"implementing", ParseImplementing},
     {"new", [](QrexParser& parser, ClassDef&) { ParseNew(parser); }, true},
     {"this", ParseThis, true},

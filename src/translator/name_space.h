@@ -54,6 +54,8 @@ class NameSpaceElement {
 
   const std::string& GetQualifiedName() const;  // a::b::N; a root's elements have their bare name
 
+  void ForgetQualifiedName() { m_qualifiedName.clear(); }  // after the name was set late
+
   ScannedFile& owner;
   const char* position;  // in the source text
   std::string name;

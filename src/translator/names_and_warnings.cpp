@@ -113,9 +113,17 @@ void QrexParser::ReportWarning(int code, std::string_view text, const NameSpaceE
 }
 
 void QrexParser::CheckPublicHeader(const NameSpaceElement& element) {
+  CheckNotExported(element);
+  CheckNotInPublicHeader(element);
+}
+
+void QrexParser::CheckNotExported(const NameSpaceElement& element) {
   if (file.file.isPublicHeader && !element.m_exported) {
     ReportWarning(1009, PrintedElement(element) + " not exported in public header of library", &element);
   }
+}
+
+void QrexParser::CheckNotInPublicHeader(const NameSpaceElement& element) {
   if (!file.file.isPublicHeader && element.m_exported && IsLibrary(GetProject().targetType)) {
     ReportWarning(1008, PrintedElement(element) + " doesn't appear in public header of library");
   }

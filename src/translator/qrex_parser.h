@@ -102,9 +102,11 @@ class QrexParser : public ExpressionParser {
   // Position: `address` in the expanded text, else the element's, else where the scanner reads.
   void ReportWarning(int code, std::string_view text, const NameSpaceElement* element = nullptr,
                      const char* address = nullptr);
-  void CheckPublicHeader(const NameSpaceElement& element);  // W1009, W1008
-  void CheckReferences(const NameSpaceElement& element);    // W1002
-  void CheckMetadata(const NameSpaceElement& element);      // W1001: non-reflected with metadata
+  void CheckPublicHeader(const NameSpaceElement& element);       // both of the following
+  void CheckNotExported(const NameSpaceElement& element);        // W1009
+  void CheckNotInPublicHeader(const NameSpaceElement& element);  // W1008
+  void CheckReferences(const NameSpaceElement& element);         // W1002
+  void CheckMetadata(const NameSpaceElement& element);           // W1001: non-reflected with metadata
 
   const char* SourcePosition() {
     out.Flush();
@@ -115,7 +117,8 @@ class QrexParser : public ExpressionParser {
   bool AtFileScope() const { return m_nameSpaces.size() == 1; }
   const Project& GetProject() const { return *file.file.project; }
 
-  int nesting = 0;  // of declarations inside declarations, see NestingGuard
+  const char* lastNameEnd = nullptr;  // behind the name that ParseTypeWithName read last
+  int nesting = 0;                    // of declarations inside declarations, see NestingGuard
   ScannedFile& file;
   QrexParserOutputStream& stream;
   TextWriter& out;

@@ -192,6 +192,7 @@ bool QrexParser::ParseTypeWithName(TypeCode& type, std::string* name, bool nameR
     } else if (nameRequired) {
       FailExpected("identifier");
     }
+    lastNameEnd = previous.text.end;
     if (followedByParen) *followedByParen = Is(kOpenParen);
   }
   // Arrays stand outer dimension first; metadata that follows a dimension stands in front of its code.

@@ -1,0 +1,329 @@
+#include "translator/global_defs.h"
+
+#include "translator/byte_code.h"
+#include "translator/emit.h"
+#include "translator/polymorphic.h"
+#include "translator/records.h"
+
+namespace qrex {
+
+void GlobalFunctionDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
+  CollectNamedTypes(signature, *owner.rootNameSpace, out);
+}
+
+// --- $function
+
+namespace {
+
+std::string SignatureText(const FunctionSignature& signature) {
+  MemoryTextWriter text;
+  WriteSignature(text, signature);
+  return text.TakeText();
+}
+
+bool SameSignature(const GlobalFunctionDef& a, const GlobalFunctionDef& b) {
+  NameSpace& rootA = *a.owner.rootNameSpace;
+  NameSpace& rootB = *b.owner.rootNameSpace;
+  const auto& argumentsA = a.signature.arguments;
+  const auto& argumentsB = b.signature.arguments;
+  if (argumentsA.size() != argumentsB.size()) return false;
+  for (size_t i = 0; i < argumentsA.size(); ++i) {
+    if (!SameType(argumentsA[i].type, rootA, argumentsB[i].type, rootB)) return false;
+  }
+  return SameType(a.signature.returnType, rootA, b.signature.returnType, rootB);
+}
+
+void CopyFunctionBody(QrexParser& parser, const std::string& name, const char* statement) {
+  parser.DropTo(parser.previous.text.end);
+  parser.Expect(kOpenBrace, "{");
+  for (int64_t depth = 1;;) {
+    if (parser.Is(kEndOfText)) {
+      throw LexScannerException("Met EOF while scanning body of function " + name, statement);
+    }
+    if (parser.Is(kOpenBrace)) ++depth;
+    if (parser.Is(kCloseBrace) && --depth == 0) break;
+    if (parser.Is(kDollar)) {
+      LexScanner ahead = parser.scanner;
+      if (NextToken(ahead).Is("new")) {
+        parser.CopyToCurrent();
+        parser.Advance();
+        ParseNew(parser);
+        continue;
+      }
+    }
+    parser.Advance();
+  }
+  parser.CopyTo(parser.current.text.end);
+}
+
+void CheckFunctionDefinition(QrexParser& parser, const GlobalFunctionDef& def, const GlobalFunctionDef* old) {
+  if (old && old->status == DeclStatus::Defined) parser.FailRepeated(*old, def);
+  const bool isInline = def.signature.isInline;
+  if (parser.file.file.kind == FileKind::H && !isInline) {
+    parser.ReportWarning(1011, PrintedElement(def) + " is defined in a header file and isn't inlined", &def);
+  }
+  if (IsLibrary(parser.GetProject().targetType) && !isInline && !old) {
+    parser.ReportWarning(1012, PrintedElement(def) + " defined in library without prior declaration", &def);
+  }
+}
+
+}  // namespace
+
+void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
+  parser.Advance();
+  auto made = std::make_unique<GlobalFunctionDef>(parser.file, parser.SourcePosition());
+  GlobalFunctionDef& def = *made;
+  parser.ParseExportModifier(def);
+  const char* const statement = parser.current.text.begin;
+  if (parser.Is(kShiftLeft)) parser.ParseQualifiers(def);
+  parser.ParseFunctionSignature(def.signature, false, false, polymorphic, def.m_reflected);
+  def.name = def.signature.name;
+  def.metadata = def.signature.metadata;
+  def.parent = &parser.Current();
+  parser.CheckNotExported(def);
+  GlobalFunctionDef* old = nullptr;
+  if (NameSpaceElement* found = parser.Current().Lookup(def.name)) {
+    if (found->category != Category::GlobalFunction) parser.FailConflict("function", def.name, *found);
+    old = static_cast<GlobalFunctionDef*>(found);
+  }
+  parser.Current().Add(std::move(made));
+  if (!def.signature.isInline) parser.out << ExportPrefix(def);
+  WriteSignature(parser.out, def.signature);
+  if (old && parser.WarningOn(1010) && !SameSignature(def, *old)) {
+    parser.ReportWarning(1010, PrintedElement(def) + " declarations have inconsistent signatures :\n    " +
+                                   SignatureText(def.signature) + "\n    " + SignatureText(old->signature) + "\n");
+    parser.SeeDeclaration(*old);
+  }
+  if (parser.Is(kSemicolon)) {
+    parser.CheckNotInPublicHeader(def);
+    if (def.ContainsMetaData()) {
+      parser.ReportWarning(1000, "Forward declaration of " + PrintedElement(def) + " contains metadata", &def);
+    }
+    parser.DropBehindCurrent();
+    if (polymorphic) {
+      parser.out << "\n";
+      WriteDispatchBody(parser.out, def);
+      def.status = DeclStatus::Defined;
+    } else {
+      parser.out << ";";
+    }
+    parser.Flush();
+    return;
+  }
+  if (polymorphic) {
+    parser.Fail("; expected after definition of " + PrintedElement(def) + " when read " + Printed(parser.current));
+  }
+  CheckFunctionDefinition(parser, def, old);
+  def.status = DeclStatus::Defined;
+  parser.CheckReferences(def);
+  parser.CheckMetadata(def);
+  CopyFunctionBody(parser, def.name, statement);
+}
+
+// --- $var, $typedef
+
+namespace {
+
+// What `+` and the qualifier list say, ahead of the element itself.
+struct DeclaredFlags {
+  bool exported = false, reflected = false, registered = false, isExtern = false;
+
+  void Read(QrexParser& parser, bool externAllowed) {
+    parser.RequireIObjectImport();
+    parser.Advance();
+    exported = reflected = registered = parser.ParseExportModifier();
+    if (parser.Is(kShiftLeft)) {
+      parser.ParseQualifierFlags(reflected, registered, " >> on $typedef", externAllowed ? &isExtern : nullptr);
+    }
+  }
+
+  void Set(NameSpaceElement& element) const {
+    element.m_exported = element.m_strict = exported;
+    element.m_reflected = reflected;
+    element.m_registered = registered;
+  }
+};
+
+// To the `;`, so that array suffixes and initialisers are copied.
+void CopyToSemicolon(QrexParser& parser, const std::string& atEnd, const char* position) {
+  while (!parser.Is(kSemicolon)) {
+    if (parser.Is(kEndOfText)) throw LexScannerException(atEnd, position);
+    parser.Advance();
+  }
+  parser.CopyTo(parser.current.text.end);
+}
+
+// The type without the array suffixes that stand behind the name: the source's own are copied.
+std::string_view WithoutArrays(std::string_view type) {
+  for (;;) {
+    type = SkipMetadata(type);
+    const uint8_t op = static_cast<uint8_t>(type.front());
+    if (op == kOpArray) {
+      type = ArrayElement(type);
+    } else if (op == kOpDynArray) {
+      type.remove_prefix(1);
+    } else {
+      return type;
+    }
+  }
+}
+
+// Reads type and name. `nameEnd`: behind the name as read. False when no type stands here.
+bool ReadTypeAndName(QrexParser& parser, TypeCode& type, std::string& name, bool reflected, const char*& nameEnd) {
+  // The name's end is found on a copy: the suffixes behind it belong to the type.
+  if (!parser.ParseTypeWithName(type, &name, true, nullptr, reflected)) return false;
+  nameEnd = parser.lastNameEnd;
+  return true;
+}
+
+template <typename Def>
+Def& AddDeclared(QrexParser& parser, const DeclaredFlags& flags, TypeCode type, const std::string& name,
+                 std::string_view keyword) {
+  if (NameSpaceElement* found = parser.Current().Lookup(name)) parser.FailConflict(keyword, name, *found);
+  auto made = std::make_unique<Def>(parser.file, parser.SourcePosition());
+  Def& def = *made;
+  def.name = name;
+  def.type = std::move(type);
+  flags.Set(def);
+  parser.Current().Add(std::move(made));
+  return def;
+}
+
+}  // namespace
+
+void ParseGlobalVar(QrexParser& parser) {
+  DeclaredFlags flags;
+  flags.Read(parser, false);
+  const char* const position = parser.current.text.begin;
+  TypeCode type;
+  std::string name;
+  const char* nameEnd = nullptr;
+  if (!ReadTypeAndName(parser, type, name, flags.reflected, nameEnd)) {
+    parser.Fail("Variable declaration expected when read " + Printed(parser.current));
+  }
+  const auto& def = AddDeclared<GlobalVarDef>(parser, flags, type, name, "var");
+  parser.CheckNotExported(def);
+  PrintType(parser.out, WithoutArrays(def.type));
+  parser.out << " " << name;
+  parser.Flush();
+  parser.DropTo(nameEnd);
+  CopyToSemicolon(parser, "Missing semicolon after definition of variable " + name, position);
+}
+
+void ParseTypedef(QrexParser& parser) {
+  DeclaredFlags flags;
+  flags.Read(parser, true);
+  const char* const position = parser.current.text.begin;
+  TypeCode type;
+  std::string name;
+  const char* nameEnd = nullptr;
+  if (!ReadTypeAndName(parser, type, name, flags.reflected, nameEnd)) {
+    parser.Fail("Type expected when read " + Printed(parser.current));
+  }
+  const auto& def = AddDeclared<TypedefDef>(parser, flags, type, name, "typedef");
+  parser.CheckNotInPublicHeader(def);
+  parser.CheckNotExported(def);
+  if (!flags.isExtern) {
+    parser.out << "typedef ";
+    PrintType(parser.out, WithoutArrays(def.type));
+    parser.out << " " << name;
+  }
+  parser.Flush();
+  parser.DropTo(nameEnd);
+  parser.CheckMetadata(def);
+  CopyToSemicolon(parser, "Missing semicolon after typedef " + name, position);
+  parser.out << "\ninline vesk::ConstStringZ GetTypedefName_" << name << "()\n";
+  {
+    Block body(parser.out);
+    parser.out << "return \"" << def.GetQualifiedName() << "\";\n";
+  }
+  parser.Flush();
+}
+
+// --- Records
+
+void GlobalDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
+  if (!HaveSomethingToRegister() || !m_registered) return;
+  WriteReflectionHead(out, *this);
+  NameSpaceFrame frame(out, parent);
+  IndentScope indent(out, 4);
+  lists.registerNames.push_back(GetQualifiedName());
+  out << "void _Register_" << name << "()\n";
+  Block body(out);
+  WriteReflectedDefinition(out);
+}
+
+namespace {
+
+void WriteRegister(TextWriter& out, const NameSpaceElement& element, std::string_view suffix) {
+  out << "vxVerify(vesk::RegisterReflected" << element.GetReflectedKindName() << "(&" << element.name << suffix
+      << ",vesk::" << TargetIdentifier(element) << "_GetXTarget()) == vesk::NSE_OK);\n";
+}
+
+std::string StringTableOrZero(const StringTable& strings, const std::string& name) {
+  return strings.Empty() ? "0" : name + "_stringTable";
+}
+
+}  // namespace
+
+void GlobalFunctionDef::WriteReflectedDefinition(TextWriter& out) {
+  StringTable strings;
+  if (!metadata.empty()) WriteMetadataByteCode(out, name + "_metadata", strings, metadata);
+  if (!IsVoid(signature.returnType)) WriteTypeByteCode(out, name + "_return", strings, signature.returnType);
+  for (const FunctionArg& argument : signature.arguments) {
+    WriteTypeByteCode(out, name + "_arg_" + argument.name, strings, argument.type);
+  }
+  if (!signature.arguments.empty()) {
+    out << "static const vesk::ReflectedArg " << name << "_args[] =\n";
+    Block rows(out, ";");
+    for (const FunctionArg& argument : signature.arguments) {
+      WriteText(out, "{ \"$1\", $0_arg_$1 },\n", {name, argument.name});
+    }
+  }
+  WriteStringTable(out, strings, name);
+  out << "static const vesk::ReflectedGlobalFunction " << name << "_function =\n";
+  {
+    Block record(out, ";");
+    out << "\"" << GetQualifiedName() << "\",\n";
+    out << "{" << (IsVoid(signature.returnType) ? "0" : name + "_return") << "},\n";
+    WriteCountedName(out, signature.arguments.size(), name + "_args");
+    out << "\n";
+    WriteNameOrZero(out, !metadata.empty(), name + "_metadata");
+    out << "\n";
+    out << StringTableOrZero(strings, name) << ",\n";
+    out << "(vesk::FunctionPointer)(";
+    PrintType(out, signature.returnType);
+    out << " (*)(";
+    WriteArgDeclarations(out, signature.arguments);
+    out << ")" << (signature.isConst ? " const" : "") << ")&" << GetQualifiedName() << "\n";
+  }
+  WriteRegister(out, *this, "_function");
+}
+
+void GlobalVarDef::WriteReflectedDefinition(TextWriter& out) {
+  StringTable strings;
+  WriteTypeByteCode(out, name + "_type", strings, type);
+  WriteStringTable(out, strings, name);
+  out << "static const vesk::ReflectedGlobalVariable " << name << "_var =\n";
+  {
+    Block record(out, ";");
+    out << "\"" << GetQualifiedName() << "\",\n&" << name << ",\n" << name << "_type,\n";
+    out << StringTableOrZero(strings, name) << "\n";
+  }
+  WriteRegister(out, *this, "_var");
+}
+
+void TypedefDef::WriteReflectedDefinition(TextWriter& out) {
+  StringTable strings;
+  WriteTypeByteCode(out, name + "_type", strings, type);
+  WriteStringTable(out, strings, name);
+  out << "static const vesk::ReflectedTypedef " << name << "_typedef =\n";
+  {
+    Block record(out, ";");
+    out << "\"" << GetQualifiedName() << "\",\n" << name << "_type,\n";
+    out << StringTableOrZero(strings, name) << "\n";
+  }
+  WriteRegister(out, *this, "_typedef");
+}
+
+}  // namespace qrex
