@@ -151,6 +151,7 @@ bool FullPath(const std::string& path, std::string& out) {
   const boost::filesystem::path full = boost::filesystem::absolute(path, error);
   if (path.empty() || error) return false;
   out = full.lexically_normal().generic_string();
+  if (out.size() > 2 && out.compare(out.size() - 2, 2, "/.") == 0) out.resize(out.size() - 2);
   if (out.size() > 1 && out.back() == '/') out.pop_back();
   return true;
 }

@@ -96,7 +96,6 @@ void ParseFunctor(QrexParser& parser) {
   if (!parser.Is(kSemicolon)) {
     parser.Fail("; expected after definition of " + PrintedElement(def) + " when read " + Printed(parser.current));
   }
-  parser.DropBehindCurrent();
   WriteFunctorClass(parser.out, def);
   WriteTypeTraits(parser.out, def);
   parser.Flush();

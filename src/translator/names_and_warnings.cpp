@@ -63,8 +63,8 @@ void QrexParser::ParseQualifierFlags(bool& reflected, bool& registered, std::str
     } else if (Is("register")) {
       registered = on;
       if (on) reflected = true;
-    } else if (isExtern && on && Is("extern")) {
-      *isExtern = true;
+    } else if (isExtern && Is("extern")) {
+      *isExtern = on;
     } else {
       Fail("Unrecognised qualifier << " + Printed(current) + std::string(onWhat));
     }

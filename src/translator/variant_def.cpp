@@ -270,9 +270,10 @@ void VariantStatement::ReadItem() {
 
 void VariantStatement::ReadBody() {
   TextWriter& out = m_parser.out;
-  out << "class " << m_def->name << "\n{\npublic:\n";
+  out << "class " << m_def->name << "\n";
   {
-    IndentScope indent(out, 4);
+    Block body(out, ";");
+    out << "public:\n";
     m_parser.Expect(kOpenBrace, "{");
     if (m_parser.Is("default")) ReadDefault();
     while (!m_parser.Is(kDollar) && !m_parser.Is(kDollarDollar) && !m_parser.Is(kCloseBrace)) ReadItem();
@@ -286,7 +287,6 @@ void VariantStatement::ReadBody() {
     out << "\n";
     WriteVariantBody(out, *m_def);
   }
-  out << "};\n";
 }
 
 void VariantStatement::Parse() {
