@@ -6,6 +6,7 @@
 #include "translator/byte_code.h"
 #include "translator/emit.h"
 #include "translator/records.h"
+#include "translator/remote_interface.h"
 #include "translator/scanned_file.h"
 
 namespace qrex {
@@ -260,6 +261,7 @@ void InterfaceDef::WriteReflectedDefinition(TextWriter& out) { InterfaceRecord(o
 
 void InterfaceDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   NameSpaceElement::WriteReflection(out, lists);
+  if (status == DeclStatus::Defined && m_isIpc) WriteRemoteInterface(out, *this);
 }
 
 }  // namespace qrex
