@@ -11,6 +11,33 @@
 
 namespace qrex {
 
+std::vector<std::string> IncludePaths(const Project& project, const ProjectConfig& config, bool translated) {
+  const std::string base = translated ? TranslationDirectory(config) : project.rootDir;
+  std::vector<std::string> paths = {PathJoin(base, project.rootToProjDir), PathJoin(base, project.sourceDir)};
+  if (translated) paths.push_back(base);
+  const auto& roots = project.settings->virtualTree;
+  paths.insert(paths.end(), roots.begin(), roots.end());
+  return paths;
+}
+
+std::string CompiledPath(const Project& project, const ProjectConfig& config, const ProjectFile& file) {
+  return project.usesQrex ? PathJoin(TranslationDirectory(config), file.path) : project.SourcePath(file);
+}
+
+std::string_view GccTargetExtension(TargetType type) {
+  static constexpr std::string_view kExtensions[] = {"", "a", "", "so", "???"};
+  return kExtensions[static_cast<size_t>(type)];
+}
+
+std::string GccTargetPath(const Project& project, const ProjectConfig& config) {
+  const std::string_view extension = GccTargetExtension(project.targetType);
+  std::string path = project.settings->exportLib + "/" + config.platform + "/" + config.name + "/";
+  if (IsLibrary(project.targetType)) path += "lib";
+  path += project.name;
+  if (!extension.empty()) path.append(".").append(extension);
+  return path;
+}
+
 std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
   return builder.IntermediateDirectory() + "/" + file.stem + (IsGccFamily(builder.settings.compiler) ? ".o" : ".obj");
 }
@@ -21,28 +48,22 @@ std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile&
 
 namespace {
 
-void WriteIncludePaths(TextWriter& out, const ProjectBuilder& builder) {
-  const std::string_view option = IsVisualCpp(builder.settings.compiler) ? "/I " : "-I";
-  auto write = [&](const std::string& path) { out << " " << option << "\"" << path << "\""; };
-  const Project& project = builder.project;
-  const std::string base = project.usesQrex ? TranslationDirectory(builder.config) : project.rootDir;
-  write(PathJoin(base, project.rootToProjDir));
-  write(PathJoin(base, project.sourceDir));
-  if (project.usesQrex) write(base);
-  for (const std::string& root : builder.settings.virtualTree) write(root);
-}
-
 std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file, const std::string& input) {
   const std::string directory = builder.IntermediateDirectory();
   MemoryTextWriter text;
+  auto writeIncludePaths = [&](std::string_view option) {
+    for (const std::string& path : IncludePaths(builder.project, builder.config, builder.project.usesQrex)) {
+      text << " " << option << "\"" << path << "\"";
+    }
+  };
   if (IsGccFamily(builder.settings.compiler)) {
     text << builder.config.compilerText;
-    WriteIncludePaths(text, builder);
+    writeIncludePaths("-I");
     text << " -o \"" << directory << "/" << file.stem << ".o\"";
   } else {
     const std::string_view prefix = builder.settings.compiler == CompilerKind::vc6 ? "build_" : "";
     WriteCompilerSwitches(text, file, builder.config);
-    WriteIncludePaths(text, builder);
+    writeIncludePaths("/I ");
     text << " /Fp\"" << directory << "/" << prefix << builder.project.name << ".pch\"";
     text << " /Fo\"" << directory << "/\"";
     text << " /Fd\"" << directory << "/\"";

@@ -1,22 +1,78 @@
 #include "generators/generate.h"
 
-#include <algorithm>
+#include <type_traits>
+
+#include "generators/codeblocks.h"
+#include "generators/common.h"
+#include "generators/geany.h"
+#include "generators/make_files.h"
+#include "generators/solution.h"
+#include "generators/vc10_project.h"
+#include "generators/vc6_project.h"
+#include "generators/vc8_project.h"
+#include "text/output_policy.h"
 
 namespace qrex {
 
-bool AnyProjectUsesQrex(const Workspace& workspace) {
-  return std::any_of(workspace.projects.begin(), workspace.projects.end(),
-                     [](const auto& project) { return project->usesQrex; });
+namespace {
+
+// Composes one file in memory and hands it over.
+template <typename... Args>
+void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args) {
+  MemoryTextWriter out;
+  write(out, args...);
+  WriteIfChanged(out, path);
 }
 
-void GenerateProjectFile(Project& project, bool) {
-  throw ExceptionBase("Project files are not built yet for " +
-                      std::string(CompilerKeyword(project.settings->compiler)));
+std::string MakeFileName(const std::string& name, const ProjectConfig& config) {
+  return "make_" + name + "_" + config.platform + "_" + config.name;
 }
 
-void GenerateWorkspaceFile(Workspace& workspace, bool) {
-  throw ExceptionBase("Workspace files are not built yet for " +
-                      std::string(CompilerKeyword(workspace.settings.compiler)));
+void GenerateGccProject(Project& project) {
+  if (!project.exported) {
+    for (const auto& config : project.configs) {
+      Generate(MakeFileName(project.name, *config), WriteProjectMakeFile, project, *config);
+    }
+  }
+  Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
+}
+
+void GenerateGccWorkspace(const Workspace& workspace) {
+  if (workspace.projects.empty()) return;
+  for (const auto& config : workspace.projects.front()->configs) {
+    Generate(MakeFileName(workspace.name, *config), WriteWorkspaceMakeFile, workspace, *config);
+  }
+  Generate("makefile", WriteTopMakeFile, workspace);
+  Generate(workspace.name + ".make", WriteTopMakeFile, workspace);
+  Generate(workspace.name + ".workspace", WriteCodeBlocksWorkspace, workspace);
+  Generate(workspace.name + ".geany", WriteGeanyProject, workspace);
+}
+
+}  // namespace
+
+void GenerateProjectFile(Project& project, bool buildPrefix) {
+  const CompilerKind compiler = project.settings->compiler;
+  if (IsGccFamily(compiler)) return GenerateGccProject(project);
+  const std::string stem = std::string(NamePrefix(buildPrefix)) + project.name;
+  if (compiler == CompilerKind::vc6) {
+    Generate(stem + ".dsp", WriteVc6Project, project, buildPrefix);
+  } else if (compiler < CompilerKind::vc10) {
+    Generate(stem + ".vcproj", WriteVc8Project, project, buildPrefix);
+  } else {
+    Generate(stem + ".vcxproj", WriteVc10Project, project, buildPrefix);
+    Generate(stem + ".vcxproj.filters", WriteVc10Filters, project, buildPrefix);
+  }
+}
+
+void GenerateWorkspaceFile(Workspace& workspace, bool buildPrefix) {
+  const CompilerKind compiler = workspace.settings.compiler;
+  if (IsGccFamily(compiler)) return GenerateGccWorkspace(workspace);
+  const std::string stem = std::string(NamePrefix(buildPrefix)) + workspace.name;
+  if (compiler == CompilerKind::vc6) {
+    Generate(stem + ".dsw", WriteVc6Workspace, workspace, buildPrefix);
+  } else {
+    Generate(stem + ".sln", WriteSolution, workspace, buildPrefix);
+  }
 }
 
 }  // namespace qrex

@@ -1,0 +1,41 @@
+// What the writers of project files share: names and paths of the two forms of a project, dependencies, walks of
+// folders.
+//
+// A project that passes through the translator has two forms. The plain one lists the sources; the one with the name
+// prefix "build_" lists their translated copies. Writers fill a TextWriter with line feeds alone and never touch the
+// disk; generate.cpp hands the text to WriteIfChanged.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "text/text_writer.h"
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+bool AnyProjectUsesQrex(const Workspace& workspace);
+
+// True when this form of the project lists translated files.
+inline bool IsTranslatedForm(const Project& project, bool buildPrefix) { return buildPrefix && project.usesQrex; }
+inline std::string_view NamePrefix(bool buildPrefix) { return buildPrefix ? "build_" : ""; }
+
+// The text between the last `/` and the last `.` of a subproject's path; empty when there is none.
+std::string SubprojectName(std::string_view path);
+
+// The project behind an entry of `subprojects`. Null, with an "Error : Can't find dependent project " line, when the
+// workspace does not hold it.
+const Project* FindDependency(const Project& project, const std::string& path);
+
+// Whether a file is left out of a project: resources of a library that is linked statically.
+inline bool IsLeftOut(const Project& project, const ProjectFile& file) {
+  return file.kind == FileKind::Rc && project.libraryIsStatic;
+}
+
+// The folder in which the unprefixed form lists the project file itself: "src" under the root.
+bool HoldsProjectFile(const Project& project, const ProjectFolder& parent, const ProjectFolder& folder,
+                      bool buildPrefix);
+std::string ProjectFileEntry(const Project& project, std::string_view base);  // base/sourceDir/name.qrpj
+
+}  // namespace qrex

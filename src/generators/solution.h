@@ -1,0 +1,11 @@
+// The .sln solution of Visual Studio 2005 and later.
+#pragma once
+
+#include "text/text_writer.h"
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+void WriteSolution(TextWriter& out, const Workspace& workspace, bool buildPrefix);
+
+}  // namespace qrex

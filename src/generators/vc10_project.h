@@ -1,0 +1,12 @@
+// The .vcxproj project of Visual Studio 2010 and later, and its .vcxproj.filters.
+#pragma once
+
+#include "text/text_writer.h"
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+void WriteVc10Project(TextWriter& out, Project& project, bool buildPrefix);
+void WriteVc10Filters(TextWriter& out, Project& project, bool buildPrefix);
+
+}  // namespace qrex

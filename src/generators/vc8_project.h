@@ -1,0 +1,11 @@
+// The .vcproj project of Visual Studio 2005 and 2008.
+#pragma once
+
+#include "text/text_writer.h"
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+void WriteVc8Project(TextWriter& out, Project& project, bool buildPrefix);
+
+}  // namespace qrex
