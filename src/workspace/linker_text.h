@@ -1,4 +1,4 @@
-// The raw linker switches of a configuration: as tokens, and as the libraries of its target.
+// The raw linker switches of a configuration: as tokens, as the libraries of its target, and as properties.
 #pragma once
 
 #include <set>
@@ -21,5 +21,10 @@ struct LibraryChoice {
 // Sorted, each once. Static subprojects bring their own libraries along.
 void GatherLibraries(const Project& project, const ProjectConfig& config, LibraryChoice choice,
                      std::set<std::string>& libraries);
+
+// The properties that the switches stand for, as the project generators want them. The librarian serves static
+// libraries, the linker all other targets. What cannot be read costs an "ERROR:" line.
+void ParseLinkerText(const Project& project, const ProjectConfig& config, OptionMap& options);
+void ParseLibrarianText(const Project& project, const ProjectConfig& config, OptionMap& options);
 
 }  // namespace qrex
