@@ -4,10 +4,12 @@
 
 #include <gtest/gtest.h>
 
+#include <algorithm>
 #include <filesystem>
 #include <map>
 #include <memory>
 #include <string>
+#include <vector>
 
 #include "text/files.h"
 #include "text/numbers.h"
@@ -71,23 +73,18 @@ class TestHost : public TranslationHost {
   size_t m_nextIndex = 0;
 };
 
-// Files of the project `app` stand under app/src/ unless their name holds a slash (then under app/). The project of the
-// companion runtime with Vesk/vxObject/IObject.h is there as well.
+// The world of a test is a workspace of the project `app` and the companion runtime `vxObject` with
+// Vesk/vxObject/IObject.h. A file of `app` stands under app/src/ unless its name holds a slash (then under app/: of a
+// library, these are the public headers). Paths in messages are printed relative to app/src/, or else to the tree.
 class TranslateTest : public ::testing::Test, public TraceHook {
  protected:
   TranslateTest() {
     SetTraceHook(this);
-    m_root = ::testing::TempDir() + "/" + ::testing::UnitTest::GetInstance()->current_test_info()->name();
-    std::filesystem::remove_all(m_root);
+    settings.systemName = "Linux";
     settings.platform = "x64";
     settings.config = "Debug";
     settings.compiler = CompilerKind::gcc;
-    workspace = std::make_unique<Workspace>(settings);
-    AddProject("app", "app", TargetType::Application);
-    AddProject("vxObject", "Vesk/vxObject", TargetType::Application);
-    AddFileTo(*workspace->projects[1], "Vesk/vxObject/IObject.h",
-              "namespace vesk\n{\n$interface+ IObject\n{\n};\n$interface+ IPersistable : IObject\n{\n};\n}\n");
-    host = std::make_unique<TestHost>(*workspace, *app().configs.front());
+    MakeWorld(TargetType::Application);
   }
   ~TranslateTest() override {
     SetTraceHook(nullptr);
@@ -95,34 +92,80 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     std::filesystem::remove_all(m_root);
   }
 
+  // A new world without files, in which `app` is of that kind.
+  void MakeWorld(TargetType target) {
+    host.reset();
+    trace.clear();
+    const auto& test = *::testing::UnitTest::GetInstance()->current_test_info();
+    m_root = ::testing::TempDir() + "/" + test.test_suite_name() + "." + test.name();
+    std::filesystem::remove_all(m_root);
+    workspace = std::make_unique<Workspace>(settings);
+    workspace->name = "tree";
+    AddProject("app", "app", target);
+    AddProject("vxObject", "Vesk/vxObject", TargetType::UtilityProject);
+    AddFileTo(*workspace->projects[1], "Vesk/vxObject/IObject.h",
+              "namespace vesk\n{\n$interface+ IObject\n{\n};\n$interface+ IPersistable : IObject\n{\n};\n}\n");
+    host = std::make_unique<TestHost>(*workspace, *app().configs.front());
+  }
+
   void OnTrace(std::string_view text) override { trace.append(text); }
   Project& app() { return *workspace->projects.front(); }
 
-  void AddFile(const std::string& name, const std::string& text) {
-    AddFileTo(app(), (name.find('/') == std::string::npos ? "app/src/" : "app/") + name, text);
+  static std::string PathOf(const std::string& name) {
+    return (name.find('/') == std::string::npos ? "app/src/" : "app/") + name;
   }
+  void AddFile(const std::string& name, const std::string& text) { AddFileTo(app(), PathOf(name), text); }
+  ScannedFile& Scanned(const std::string& name) { return host->GetScannedFile(*host->FindFile(PathOf(name))); }
 
-  // The generated text. Throws what the translation throws.
+  // The generated text. Throws what the translation throws. A header and its .cpp must both be there before the first
+  // of them is translated.
   std::string Translate(const std::string& name) {
-    const std::string path = (name.find('/') == std::string::npos ? "app/src/" : "app/") + name;
     app().CollectFiles();
-    ScannedFile& file = host->GetScannedFile(*host->FindFile(path));
+    ScannedFile& file = Scanned(name);
     LoadText(file.sourceText, file.SourcePath(), true);
     file.translated = true;
-    MemoryTextWriter text;
+    std::string text;
     struct Target : IOutputStream {
-      explicit Target(TextWriter& out) : out(out) {}
-      void Write(const void* data, size_t n) override { out << std::string_view(static_cast<const char*>(data), n); }
+      explicit Target(std::string& out) : out(out) {}
+      void Write(const void* data, size_t n) override { out.append(static_cast<const char*>(data), n); }
       void Flush() override {}
-      TextWriter& out;
+      std::string& out;
     } target(text);
     TranslateFile(file, target);
-    return text.TakeText();
+    return text;
   }
-
   std::string Translate(const std::string& name, const std::string& text) {
     AddFile(name, text);
     return Translate(name);
+  }
+
+  // What comes of a header `t.h` that imports IObject.h, then holds `text`, and of its empty `t.cpp`: the text proper
+  // of the one (between head and foot, without the import), and the reflection tail in the other. Makes a new world of
+  // the kind that `app` has.
+  struct Generated {
+    std::string header, tail;
+  };
+  Generated TranslateHeader(const std::string& text) {
+    MakeWorld(app().targetType);
+    AddFile("t.h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);
+    AddFile("t.cpp", "@import \"t.h\"\n");
+    Generated generated;
+    generated.header = Translate("t.h");
+    generated.tail = Translate("t.cpp");
+    Cut(generated.header,
+        "#pragma once\n#ifndef _app_src_t_h\n#define _app_src_t_h\n\n#include \"Vesk/vxObject/IObject.h\"\n",
+        "\n#endif // include guard\n");
+    Cut(generated.tail, "#include \"t.h\"\n", "");
+    return generated;
+  }
+  void AssertHeader(const std::string& text, const std::string& header) {
+    ASSERT_EQ(header, TranslateHeader(text).header);
+  }
+  void AssertTail(const std::string& text, const std::string& tail) { ASSERT_EQ(tail, TranslateHeader(text).tail); }
+  void AssertGenerated(const std::string& text, const std::string& header, const std::string& tail) {
+    const Generated generated = TranslateHeader(text);
+    ASSERT_EQ(header, generated.header);
+    ASSERT_EQ(tail, generated.tail);
   }
 
   // The printed form of the error that the translation of `text` raises.
@@ -131,9 +174,33 @@ class TranslateTest : public ::testing::Test, public TraceHook {
       std::string generated = Translate(name, text);
       return "no error, but:\n" + generated;
     } catch (const IException& exception) {
-      return ExceptionText(exception);
+      return WithShortPaths(ExceptionText(exception));
     }
   }
+
+  // Tables of header texts and the error that each raises, or the messages that its translation prints, in a new world
+  // for each, of the kind that `app` has. The import of IObject.h stands on the first line of the text.
+  struct MessageCase {
+    std::string text, message;
+  };
+  void AssertErrors(const std::vector<MessageCase>& cases, const std::string& name = "t.h") {
+    for (const auto& [text, message] : cases) {
+      SCOPED_TRACE(text);
+      MakeWorld(app().targetType);
+      EXPECT_EQ(name + message, ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text));
+    }
+  }
+  void AssertMessages(const std::vector<MessageCase>& cases, const std::string& name = "t.h") {
+    for (const auto& [text, message] : cases) {
+      SCOPED_TRACE(text);
+      MakeWorld(app().targetType);
+      const std::string error = ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
+      EXPECT_EQ("no error", error.substr(0, 8)) << error;
+      EXPECT_EQ(message, Messages());
+    }
+  }
+
+  std::string Messages() const { return WithShortPaths(trace); }  // all that was printed
 
   Project& AddProject(const std::string& name, const std::string& directory, TargetType type) {
     workspace->projects.push_back(std::make_unique<Project>(*workspace));
@@ -157,13 +224,15 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     file->path = path;
     file->name = std::string(FileNameOf(path));
     StemOf(file->name, file->stem);
-    file->extension = file->name.substr(file->stem.size() + 1);
+    file->extension = file->name.substr(std::min(file->stem.size() + 1, file->name.size()));
     file->kind = FileKindOf(file->extension);
     file->isMainSource = file->kind == FileKind::Cpp && file->stem == project.name;
     file->isPublicHeader = file->kind == FileKind::H && IsLibrary(project.targetType) &&
                            path.compare(0, project.sourceDir.size(), project.sourceDir) != 0;
     project.rootFolder.files.push_back(file.get());
     project.filesByPath[path] = std::move(file);
+    project.filesCollected = false;
+    project.folders.clear();
     CreateDirectories(m_root + "/" + path, false);
     ReplaceFile(m_root + "/" + path, text);
   }
@@ -174,6 +243,19 @@ class TranslateTest : public ::testing::Test, public TraceHook {
   std::string trace;  // what was written to the trace log
 
  private:
+  std::string WithShortPaths(std::string text) const {
+    ReplaceAllInPlace(text, m_root + "/", "");
+    ReplaceAllInPlace(text, "app/src/", "");
+    return text;
+  }
+
+  static void Cut(std::string& text, const std::string& head, const std::string& foot) {
+    ASSERT_EQ(head, text.substr(0, head.size()));
+    text.erase(0, head.size());
+    ASSERT_TRUE(text.size() >= foot.size() && text.compare(text.size() - foot.size(), foot.size(), foot) == 0) << text;
+    text.erase(text.size() - foot.size());
+  }
+
   std::string m_root;
 };
 
