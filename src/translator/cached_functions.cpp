@@ -16,9 +16,9 @@ class CachedFunction {
   CachedFunction(QrexParser& parser, ClassDef& def) : m_parser(parser), m_out(parser.out), m_def(def) {}
 
   void Parse() {
-    m_hard = ReadNodeHeadInto();
+    m_head = ReadNodeHead(m_parser, m_def);
     if (m_parser.Accept(kShiftLeft)) ReadQualifiers();
-    m_parser.ParseFunctionSignature(m_written, true, false, false, m_reflected);
+    m_parser.ParseFunctionSignature(m_written, true, false, false, m_head.reflected);
     if (!m_written.isConst) m_parser.Fail("$cache function must be declared const");
     Normalise();
     m_parser.DropToCurrent();
@@ -33,11 +33,6 @@ class CachedFunction {
   }
 
  private:
-  bool ReadNodeHeadInto() {
-    const NodeHead head = ReadNodeHead(m_parser, m_def);
-    m_reflected = head.reflected;
-    return head.hard;
-  }
   void ReadQualifiers();
   void ReadQueue();
   void Normalise();
@@ -49,7 +44,9 @@ class CachedFunction {
   void WriteRecalc(const std::string& keyArguments);
   void WriteQueueIndex();
   std::string BaseText(std::string_view keyed, const std::string& keyType) const;
-  void WriteAccessorHead();
+  void WriteKeyedName();
+  void WriteFinalSelf(std::string_view self);
+  void WriteAccessor(const std::string& value);
 
   std::string Node() const { return "_depnode_" + m_written.name; }
   std::string Calc() const { return "_calc_" + m_written.name; }
@@ -66,7 +63,8 @@ class CachedFunction {
   FunctionSignature m_written;    // as declared
   FunctionSignature m_signature;  // returns the output
   std::string m_output;           // its type's text
-  bool m_reflected = false, m_hard = false, m_byReference = false, m_async = false, m_asyncIo = false;
+  NodeHead m_head;
+  bool m_byReference = false, m_async = false, m_asyncIo = false;
   int64_t m_queue = 0;
   TypeCode m_inputType;
   std::string m_inputName;
@@ -121,7 +119,8 @@ void CachedFunction::Normalise() {
 void CachedFunction::ReadInput() {
   if (!m_async) throw LexScannerException("'with' only allowed on async $cache function", m_parser.previous);
   bool followedByParen = false;
-  if (!m_parser.ParseTypeWithName(m_inputType, &m_inputName, true, &followedByParen, m_reflected) || followedByParen) {
+  if (!m_parser.ParseTypeWithName(m_inputType, &m_inputName, false, &followedByParen, m_head.reflected) ||
+      m_inputName.empty() || followedByParen) {
     m_parser.Fail("Error parsing input type and name");
   }
   m_out << "void " << Calc() << "_input(";
@@ -130,7 +129,7 @@ void CachedFunction::ReadInput() {
   WriteArgDeclarations(m_out, m_signature.arguments);
   m_out << ") const\n";
   if (m_parser.Accept(kAssign)) {
-    const std::string body = ReadShortBody(m_parser, m_inputName);
+    const std::string body = ReadShortBody(m_parser, m_def, m_inputName);
     m_parser.Advance();
     m_parser.DropToCurrent();
     Block block(m_out);
@@ -199,10 +198,10 @@ std::string CachedFunction::BaseText(std::string_view keyed, const std::string& 
 void CachedFunction::WriteRecalc(const std::string& keyArguments) {
   const bool isKeyed = !keyArguments.empty();
   const bool hasPairKey = m_signature.arguments.size() > 1;
-  if (m_hard) m_out << Node() << "() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }\n";
+  if (m_head.hard) m_out << Node() << "() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }\n";
   m_out << "virtual bool RecalcCache() const\n";
   Block body(m_out);
-  if (!m_hard) m_out << (isKeyed ? "auto" : m_output) << " _prev = _output;\n";
+  if (!m_head.hard) m_out << (isKeyed ? "auto" : m_output) << " _prev = _output;\n";
   if (hasPairKey) m_out << KeyType() << " const& _key = _GetKey();\n";
   const std::string key = !isKeyed ? "" : hasPairKey ? keyArguments : "_GetKey()";
   const std::string self = isKeyed ? "_self->" : "_GetSelf()->";
@@ -212,7 +211,7 @@ void CachedFunction::WriteRecalc(const std::string& keyArguments) {
     m_out << "_output = " << self << Calc() << "(" << key << ");\n";
   }
   m_out << "if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();\n";
-  m_out << (m_hard ? "return true;\n" : "return _prev != _output;\n");
+  m_out << (m_head.hard ? "return true;\n" : "return _prev != _output;\n");
 }
 
 void CachedFunction::WriteNodeMembers(const std::string& keyArguments) {
@@ -241,81 +240,72 @@ void CachedFunction::WriteQueueIndex() {
   if (m_queue != 0) m_out << "virtual vesk::ssize_t EvictionQueueIndex() const { return " << m_queue << "; }\n";
 }
 
-void CachedFunction::WriteAccessorHead() {
+void CachedFunction::WriteFinalSelf(std::string_view self) {
+  if (m_def.IsMixin()) {
+    WriteText(m_out,
+              "const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename "
+              "BC::FinalClass*>($0); }\n",
+              {self});
+  } else {
+    WriteText(m_out, "$0 const* _GetFinalSelf() const { return $1; }\n", {m_def.name, self});
+  }
+}
+
+// The function under its declared name, which asks the node.
+void CachedFunction::WriteAccessor(const std::string& value) {
   FunctionSignature accessor = m_signature;
-  accessor.returnType.clear();
-  m_out << (accessor.isInline ? "inline " : "") << m_output << " const& ";
-  MemoryTextWriter text;
-  accessor.isInline = false;
-  accessor.returnType = TypeCode(1, static_cast<char>(kOpVoid));
-  WriteSignature(text, accessor);
-  m_out << text.TakeText().substr(std::string_view("void ").size()) << "\n";
+  accessor.returnType.insert(0, {kOpReference, kOpConst});
+  WriteSignature(m_out, accessor);
+  m_out << "\n";
+  Block body(m_out);
+  m_out << "return " << value << ";\n";
 }
 
 void CachedFunction::WritePlain() {
   const std::string& name = m_written.name;
   const std::string base = BaseText("", "");
-  m_out << "struct " << Node() << " : public " << base << "\n{\n";
+  m_out << "struct " << Node() << " : public " << base << "\n";
   {
-    IndentScope indent(m_out, 4);
+    Block node(m_out, " _dn_" + name + ";");
     m_out << "typedef " << base << " base;\nusing typename base::output_type;\n";
     WriteNodeMembers("");
     WriteText(m_out, "$0 const* _GetSelf() const { return CONST_ATTRIB_CAST($0,_dn_$1); }\n", {m_def.name, name});
-    if (m_def.IsMixin()) {
-      m_out << "const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename "
-               "BC::FinalClass*>(_GetSelf()); }\n";
-    } else {
-      m_out << m_def.name << " const* _GetFinalSelf() const { return _GetSelf(); }\n";
-    }
+    WriteFinalSelf("_GetSelf()");
     WriteText(m_out, "virtual vesk::xstring Name() const { return \"$0::$1()\"; }\n", {m_def.name, name});
     WriteQueueIndex();
   }
-  m_out << "} _dn_" << name << ";\n";
-  WriteAccessorHead();
-  {
-    Block body(m_out);
-    m_out << "return _dn_" << name << ".read();\n";
-  }
+  WriteAccessor("_dn_" + name + ".read()");
   m_def.m_evictionMembers.push_back("_dn_" + name);
 }
 
 void CachedFunction::WriteKeyed() {
   const std::string& name = m_written.name;
   const std::string base = BaseText("Keyed", KeyType());
-  const size_t count = m_signature.arguments.size();
-  m_out << "struct " << Node() << " : public " << base << "\n{\n";
+  m_out << "struct " << Node() << " : public " << base << "\n";
   {
-    IndentScope indent(m_out, 4);
-    m_out << "typedef " << base
-          << " base;\nusing typename base::key_type;\nusing typename base::output_type;\n"
-             "using typename base::map_type;\n";
+    Block node(m_out, ";");
+    m_out << "typedef " << base << " base;\n";
+    m_out << "using typename base::key_type;\nusing typename base::output_type;\nusing typename base::map_type;\n";
     WriteNodeMembers(KeyArguments());
-    m_out << "virtual vesk::xstring Name() const\n";
-    {
-      Block body(m_out);
-      if (count > 1) m_out << KeyType() << " const& _key = _GetKey();\n";
-      m_out << "return vxMakeString(\"" << m_def.name << "::" << name << "(\"";
-      if (count == 1) m_out << " << _GetKey()";
-      for (size_t i = 0; count > 1 && i < count; ++i) m_out << " << " << KeyPart(i, ".first << ','");
-      m_out << " << ')');\n";
-    }
+    WriteKeyedName();
     WriteQueueIndex();
     m_out << "map_type& _GetMap() const { return _self->_map_" << name << "; }\n";
-    if (m_def.IsMixin()) {
-      m_out << "const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename "
-               "BC::FinalClass*>(_self); }\n";
-    } else {
-      m_out << m_def.name << " const* _GetFinalSelf() const { return _self; }\n";
-    }
+    WriteFinalSelf("_self");
   }
-  m_out << "};\n";
   m_out << "mutable typename " << Node() << "::map_type _map_" << name << ";\n";
-  WriteAccessorHead();
-  {
-    Block body(m_out);
-    m_out << "return _map_" << name << "[" << KeyExpression(0) << "].read(this);\n";
-  }
+  WriteAccessor("_map_" + name + "[" + KeyExpression(0) + "].read(this)");
   m_def.m_evictionMembers.push_back("_map_" + name);
+}
+
+void CachedFunction::WriteKeyedName() {
+  const size_t count = m_signature.arguments.size();
+  m_out << "virtual vesk::xstring Name() const\n";
+  Block body(m_out);
+  if (count > 1) m_out << KeyType() << " const& _key = _GetKey();\n";
+  m_out << "return vxMakeString(\"" << m_def.name << "::" << m_written.name << "(\"";
+  if (count == 1) m_out << " << _GetKey()";
+  for (size_t i = 0; count > 1 && i < count; ++i) m_out << " << " << KeyPart(i, ".first << ','");
+  m_out << " << ')');\n";
 }
 
 }  // namespace

@@ -58,7 +58,7 @@ void ParseClassBody(QrexParser& parser, ClassDef& def) {
 
 void ParseThis(QrexParser& parser, ClassDef&) {
   parser.Advance();
-  parser.out << "this->GetThisAsFinalClass()";
+  parser.out << kDollarThis;
   parser.Flush();
   parser.DropToCurrent();
 }
@@ -92,36 +92,35 @@ void ParseFieldOrMethod(QrexParser& parser, ClassDef& def) {
   parser.DropBehindCurrent();
 }
 
-bool ParseQualifierList(QrexParser& parser, ClassDef& def) {
-  struct Word {
-    std::string_view word;
-    TriState ClassQualifiers::*state;
-    bool needsReflection;
-  };
+const QualifierWord* FindQualifierWord(std::string_view word) {
   using Q = ClassQualifiers;
-  static constexpr Word kWords[] = {
-      {"dc", &Q::dc, true},
-      {"abstract", &Q::abstract, false},
-      {"copy", &Q::copy, true},
-      {"compare", &Q::compare, true},
-      {"print", &Q::print, true},
-      {"ser", &Q::ser, true},
-      {"os", &Q::os, false},
-      {"ar", &Q::ar, false},
-      {"extern", &Q::extern_, false},
-      {"passbyvalue", &Q::passbyvalue, true},
-      {"returnbyvalue", &Q::returnbyvalue, true},
-      {"multiline", &Q::multiline, false},
-      {"traits", &Q::traits, false},
-      {"genop", &Q::genop, false},
-      {"rod", &Q::rod, false},
+  static constexpr QualifierWord kWords[] = {
+      {"dc", &Q::dc, true, false},
+      {"abstract", &Q::abstract, false, false},
+      {"copy", &Q::copy, true, true},
+      {"compare", &Q::compare, true, true},
+      {"print", &Q::print, true, true},
+      {"ser", &Q::ser, true, true},
+      {"os", &Q::os, false, true},
+      {"ar", &Q::ar, false, true},
+      {"extern", &Q::extern_, false, true},
+      {"passbyvalue", &Q::passbyvalue, true, true},
+      {"returnbyvalue", &Q::returnbyvalue, true, true},
+      {"multiline", &Q::multiline, false, true},
+      {"traits", &Q::traits, false, false},
+      {"genop", &Q::genop, false, false},
+      {"rod", &Q::rod, false, false},
   };
+  const auto* found = std::find_if(std::begin(kWords), std::end(kWords),
+                                   [&](const QualifierWord& candidate) { return candidate.word == word; });
+  return found == std::end(kWords) ? nullptr : found;
+}
+
+bool ParseQualifierList(QrexParser& parser, ClassDef& def) {
   bool redundant = false;
   for (; !parser.Accept(kShiftRight); parser.Advance()) {
     const bool on = !parser.Accept(kMinus);
-    const auto* word = std::find_if(std::begin(kWords), std::end(kWords),
-                                    [&](const Word& candidate) { return parser.Is(candidate.word); });
-    if (word != std::end(kWords)) {
+    if (const QualifierWord* word = FindQualifierWord(parser.current.text.View())) {
       if (!on && word->word == "dc" && def.IsPureModel()) parser.Fail("Qualifier <<-dc>> invalid for a $model");
       def.qualifiers.*word->state = on ? TriState::On : TriState::Off;
       redundant = redundant || word->needsReflection;

@@ -28,14 +28,12 @@ class ClassStatement {
   void MakeElement();
   void ReadTemplateArguments();
   void ParseForward();
-  void Enter();
   void ParseModel();
   void ParseAdt();
   void ParseInterfaces();
   void CheckGeneratedOps();
   void ParseDeferred();
   void ParseDefinition();
-  void RequireSemicolon();
   void Finish();
 
   QrexParser& m_parser;
@@ -100,7 +98,7 @@ void ClassStatement::MakeElement() {
   m_def->name = m_name;
   m_def->parent = &m_parser.Current();
   m_def->m_nested = IsNested();
-  m_def->m_exported = m_def->m_reflected = m_def->m_registered = m_def->m_strict = m_exported;
+  m_def->SetExported(m_exported);
   if (m_implement) m_def->m_methods = m_old->m_methods;
   if (m_parser.Is(kLess)) ReadTemplateArguments();
 }
@@ -139,31 +137,16 @@ void ClassStatement::ParseForward() {
   if (m_exported) m_parser.ReportWarning(1017, "+ on forward declaration of " + m_name + " deprecated");
   WriteForwardDeclaration(m_out, *m_def);
   m_def->status = DeclStatus::Forward;
-  if (!m_old) Enter();
+  if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
   m_parser.Flush();
   m_parser.DropBehindCurrent();
-}
-
-void ClassStatement::Enter() {
-  if (IsNested()) {
-    m_enclosing->m_ownedElements.push_back(std::move(m_made));
-  } else {
-    m_parser.Current().Add(std::move(m_made));
-  }
-}
-
-void ClassStatement::RequireSemicolon() {
-  if (!m_parser.Is(kSemicolon)) {
-    m_parser.Fail("; expected after definition of " + PrintedElement(*m_def) + " when read " +
-                  Printed(m_parser.current));
-  }
 }
 
 void ClassStatement::ParseModel() {
   m_def->status = DeclStatus::Defined;
   ParseModelStruct(m_parser, *m_def);
   m_parser.Advance();
-  RequireSemicolon();
+  m_parser.RequireSemicolonAfter(*m_def);
   WriteReflectionDeclarations(m_out, *m_def);
   WriteModelMixin(m_out, *m_def);
 }
@@ -176,7 +159,7 @@ void ClassStatement::ParseAdt() {
   if (!m_parser.Is(kOpenBrace)) m_parser.FailExpected("{");
   ParseAdtBody(m_parser, *m_def);
   m_parser.Advance();
-  RequireSemicolon();
+  m_parser.RequireSemicolonAfter(*m_def);
 }
 
 void ClassStatement::ParseInterfaces() {
@@ -195,10 +178,7 @@ void ClassStatement::ParseInterfaces() {
       m_parser.Fail("IPersistable classes must have a default constructor");
     }
   }
-  if (m_redundant && !m_def->m_reflected) {
-    m_parser.ReportWarning(1004, PrintedElement(*m_def) + " is not reflected and has redundant << >> directives",
-                           m_def);
-  }
+  if (m_redundant) m_parser.CheckRedundant(*m_def);
 }
 
 void ClassStatement::CheckGeneratedOps() {
@@ -255,7 +235,7 @@ void ClassStatement::ParseDefinition() {
     WriteClassMembers(m_out, *m_def);
   }
   m_parser.Advance();
-  RequireSemicolon();
+  m_parser.RequireSemicolonAfter(*m_def);
   if (isExternal) return;
   m_out << "};\n";
   if (!m_old || OldHasStatus(DeclStatus::Forward)) {
@@ -282,7 +262,7 @@ void ClassStatement::Parse() {
   CheckImplement();
   MakeElement();
   if (m_parser.Is(kSemicolon)) return ParseForward();
-  Enter();
+  m_parser.Enter(std::move(m_made), m_enclosing);
   if (!m_def->IsMixin() && !m_implement) m_parser.CheckPublicHeader(*m_def);
   if (OldHasStatus(DeclStatus::Defined)) m_parser.FailRepeated(*m_old, *m_def);
   if (m_parser.Accept(kShiftLeft)) m_redundant = ParseQualifierList(m_parser, *m_def);

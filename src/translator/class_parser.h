@@ -18,6 +18,16 @@ void ParseClassBody(QrexParser& parser, ClassDef& def);  // on `{`; leaves it on
 void ParseFieldOrMethod(QrexParser& parser, ClassDef& def);
 void ParseThis(QrexParser& parser, ClassDef& def);           // stands behind the word afterwards
 bool ParseQualifierList(QrexParser& parser, ClassDef& def);  // behind `<<`; true when some entry needs reflection
+
+// The words of << >> lists that are kept as they are said, of classes and variants.
+struct QualifierWord {
+  std::string_view word;
+  TriState ClassQualifiers::*state;
+  bool needsReflection;  // has an effect only on reflected ones
+  bool onVariant;
+};
+const QualifierWord* FindQualifierWord(std::string_view word);  // null: there is none
+
 void WriteForwardDeclaration(TextWriter& out, const ClassDef& def);
 void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def);
 

@@ -62,26 +62,85 @@ void CopyCodeBlock(QrexParser& parser, ClassDef& def) {
   parser.Flush();
 }
 
-std::string ReadBraceContent(QrexParser& parser) {
-  if (!parser.Is(kOpenBrace)) parser.FailExpected("{");
-  const char* const begin = parser.current.text.end;
-  parser.SkipToMatching(kOpenBrace, kCloseBrace, "Met EOS before read matching brace");
-  return Trimmed(begin, parser.current.text.begin);
+namespace {
+
+// Text of a class body that does not stay where it is written, with what `$` means in it.
+class CodeText {
+ public:
+  CodeText(QrexParser& parser, const ClassDef& def, const char* begin) : m_parser(parser), m_def(def), m_from(begin) {}
+
+  // Passes the current token; true when it was a `$` item.
+  bool TakeItem() {
+    if (m_parser.Is(kDollarDollar)) {
+      Take(m_parser.current.text.begin, m_parser.current.text.end);
+      m_text += m_def.name;
+      m_parser.Advance();
+      return true;
+    }
+    LexScanner ahead = m_parser.scanner;
+    if (!m_parser.Is(kDollar)) return false;
+    const LexToken word = NextToken(ahead);
+    if (!word.Is("this") && !word.Is("new")) return false;
+    Take(m_parser.current.text.begin, word.text.end);
+    m_parser.Advance();
+    if (word.Is("this")) {
+      m_text += kDollarThis;
+      m_parser.Advance();
+      return true;
+    }
+    m_text += kDollarNew;
+    SkipNewExpression(m_parser);
+    Take(m_parser.current.text.begin, m_parser.current.text.begin);
+    m_text += ")";
+    return true;
+  }
+
+  std::string TextTo(const char* end) {
+    Take(end, end);
+    return Trimmed(m_text.data(), m_text.data() + m_text.size());
+  }
+
+ private:
+  void Take(const char* end, const char* next) {
+    if (m_from < end) m_text.append(m_from, end);
+    m_from = next;
+  }
+
+  QrexParser& m_parser;
+  const ClassDef& m_def;
+  const char* m_from;
+  std::string m_text;
+};
+
+}  // namespace
+
+std::string ReadBraceContent(QrexParser& parser, const ClassDef& def) {
+  CodeText code(parser, def, parser.current.text.end);
+  parser.Expect(kOpenBrace, "{");
+  for (int64_t depth = 1;;) {
+    if (parser.Is(kEndOfText)) parser.Fail("Met EOS before read matching brace");
+    if (code.TakeItem()) continue;
+    if (parser.Is(kOpenBrace)) ++depth;
+    if (parser.Is(kCloseBrace) && --depth == 0) return code.TextTo(parser.current.text.begin);
+    parser.Advance();
+  }
 }
 
-std::string ReadShortBody(QrexParser& parser, const std::string& name) {
+std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::string& name) {
   if (parser.Is(kOpenBrace)) {
-    std::string body = ReadBraceContent(parser);
+    std::string body = ReadBraceContent(parser, def);
     parser.Advance();
     if (!parser.Is(kSemicolon)) parser.FailExpected(";");
     return body;
   }
-  const char* const begin = parser.current.text.begin;
+  CodeText code(parser, def, parser.current.text.begin);
+  const char* end = parser.current.text.begin;  // of the last token: a comment behind it would hide the `;`
   while (!parser.Is(kSemicolon)) {
     if (parser.Is(kEndOfText)) parser.Fail("Met EOS while scanning forwards for semicolon");
-    parser.Advance();
+    if (!code.TakeItem()) parser.Advance();
+    end = parser.previous.text.end;
   }
-  return name + " = " + Trimmed(begin, parser.current.text.begin) + ";";
+  return name + " = " + code.TextTo(end) + ";";
 }
 
 std::string_view PassingSuffix(std::string_view type) {

@@ -12,9 +12,9 @@ namespace qrex {
 void CopyCodeBlock(QrexParser& parser, ClassDef& def);
 // Behind a `=`: a block in braces and a `;`, or an expression up to `;`, as "name = expression". The current token is
 // the `;` afterwards, and the text is dropped from the source.
-std::string ReadShortBody(QrexParser& parser, const std::string& name);
+std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::string& name);
 // The text between the braces; the current token is the closing one afterwards.
-std::string ReadBraceContent(QrexParser& parser);
+std::string ReadBraceContent(QrexParser& parser, const ClassDef& def);
 
 // By value are numbers, characters and pointers; " const&" for all other types.
 std::string_view PassingSuffix(std::string_view type);

@@ -104,11 +104,8 @@ class NodeField {
 };
 
 void NodeField::ReadHead() {
-  const bool caretOnIndep = m_isIndep;
   const NodeHead head = ReadNodeHead(m_parser, m_def);
-  if (head.hard && caretOnIndep) {
-    throw LexScannerException("^ not permitted on $indep", m_parser.previous);
-  }
+  if (head.hard && m_isIndep) throw LexScannerException("^ not permitted on $indep", m_parser.previous);
   if (m_parser.Accept(kShiftLeft)) ReadVisitQualifier();
   FunctionArg arg;
   if (m_isIndep && !m_parser.Is(kIdentifier) && !m_parser.Is(kColonColon)) m_parser.Fail("Syntax error");
@@ -138,7 +135,7 @@ void NodeField::ReadVisitQualifier() {
 }
 
 void NodeField::ReadShortForm() {
-  const std::string body = ReadShortBody(m_parser, m_name);
+  const std::string body = ReadShortBody(m_parser, m_def, m_name);
   m_sections |= kCalc;
   m_out << "void " << m_name << "_calc(" << Parameter() << ") const\n";
   Block block(m_out);
@@ -172,9 +169,9 @@ void NodeField::WriteDep() {
   const std::string node = "Depnode_" + m_name;
   const std::string_view passing = PassingSuffix(m_type);
   if (!m_isVoid) m_out << "mutable " << Declaration(m_storage) << ";\n";
-  m_out << "struct " << node << " : vesk::DGDepNode\n{\n";
+  m_out << "struct " << node << " : vesk::DGDepNode\n";
   {
-    IndentScope indent(m_out, 4);
+    Block block(m_out, " " + m_name + ";");
     m_out << "typedef " << Declaration("value_type") << ";\n";
     m_out << node << "() : vesk::DGDepNode(vesk::DF_SYNC_DEP" << (m_hard ? "|vesk::DF_PROPAGATE_HARD_DIRTINESS)" : ")");
     if (Has(kCreate)) {
@@ -200,7 +197,6 @@ void NodeField::WriteDep() {
                 {passing, m_def.name, m_name});
     }
   }
-  m_out << "} " << m_name << ";\n";
   if (m_isVoid) return;
   WriteText(m_out, "$0$1 Get$2() const { $2.ReadBarrier(); return $3; }\n",
             {TypeText(m_type), passing, m_name, m_storage});
@@ -251,9 +247,9 @@ void NodeField::WriteIndep() {
   const std::string node = "Indepnode_" + m_name;
   const std::string_view passing = PassingSuffix(m_type);
   m_out << Declaration(m_storage) << ";\n";
-  m_out << "struct " << node << " : vesk::DGIndepNode\n{\n";
+  m_out << "struct " << node << " : vesk::DGIndepNode\n";
   {
-    IndentScope indent(m_out, 4);
+    Block block(m_out, " " + m_name + ";");
     m_out << "typedef " << Declaration("value_type") << ";\n";
     if (Has(kCreate)) WriteMethod(node + "()", Self() + "_self->" + m_name + "_create(" + SelfStorage() + ");\n");
     if (Has(kDestroy)) {
@@ -274,7 +270,6 @@ void NodeField::WriteIndep() {
               {passing, m_def.name, m_name, m_storage});
   }
   WriteText(m_out,
-            "} $2;\n"
             "$0$1 Get$2() const { $2.ReadBarrier(); return $3; }\n"
             "void Set$2($0$1 _v) { $2.OnChange(); $3 = _v; }\n",
             {TypeText(m_type), passing, m_name, m_storage});
@@ -287,6 +282,9 @@ bool HasGeneratedBase(const ClassDef& def) {
          def.HasEmbeddedModel() || def.m_referencedModel || def.m_implementsIObject;
 }
 
+// What a class that needs registration declares in place is defined in its reflection tail.
+bool IsDefinedInTail(const ClassDef& def) { return def.HaveSomethingToRegister() && !def.IsTemplate(); }
+
 }  // namespace
 
 void ParseDep(QrexParser& parser, ClassDef& def) { NodeField(parser, def, false).Parse(); }
@@ -295,11 +293,11 @@ void ParseIndep(QrexParser& parser, ClassDef& def) { NodeField(parser, def, true
 void ParseEvict(QrexParser& parser, ClassDef& def) {
   parser.Advance();
   def.m_hasEvictBlock = true;
-  if (!def.HaveSomethingToRegister()) {
+  if (!IsDefinedInTail(def)) {
     parser.out << "void EvictDgsNodes_extra() const\n";
     return CopyCodeBlock(parser, def);
   }
-  const std::string content = ReadBraceContent(parser);
+  const std::string content = ReadBraceContent(parser, def);
   parser.out << "void EvictDgsNodes_extra() const;\n";
   MemoryTextWriter deferred;
   deferred << "void " << def.GetQualifiedName() << "::EvictDgsNodes_extra() const\n";
@@ -316,8 +314,8 @@ void ParseEvict(QrexParser& parser, ClassDef& def) {
 void ParseVisit(QrexParser& parser, ClassDef& def) {
   parser.Advance();
   def.m_hasVisitBlock = true;
-  const bool isDeferred = def.HaveSomethingToRegister();
-  const std::string content = ReadBraceContent(parser);
+  const bool isDeferred = IsDefinedInTail(def);
+  const std::string content = ReadBraceContent(parser, def);
   MemoryTextWriter text;
   text << "void " << (isDeferred ? def.GetQualifiedName() + "::" : "")
        << "VisitObjects(vesk::IObjectVisitor& v) const\n";

@@ -112,7 +112,6 @@ class EnumStatement {
  private:
   void ReadHeading();
   void ParseForward();
-  void Enter();
   void ReadQualifiers();
   void ReadEntries();
   void ReadEntry();
@@ -129,9 +128,8 @@ class EnumStatement {
 
 void EnumStatement::ReadHeading() {
   m_parser.Advance();
-  const LexToken plus = m_parser.current;
   m_exported = m_parser.ParseExportModifier();
-  if (m_exported && m_enclosing) throw LexScannerException("'+' modifier not permitted on nested enum", plus);
+  if (m_exported && m_enclosing) m_parser.Fail("'+' modifier not permitted on nested enum");
   const bool isClass = m_parser.AcceptWord("class");
   const std::string name = m_parser.RequireIdentifier();
   if (!m_enclosing) {
@@ -151,15 +149,7 @@ void EnumStatement::ReadHeading() {
   m_def->parent = &m_parser.Current();
   m_def->m_isClass = isClass;
   m_def->m_nested = m_enclosing != nullptr;
-  m_def->m_exported = m_def->m_reflected = m_def->m_registered = m_def->m_strict = m_exported;
-}
-
-void EnumStatement::Enter() {
-  if (m_enclosing) {
-    m_enclosing->m_ownedElements.push_back(std::move(m_made));
-  } else {
-    m_parser.Current().Add(std::move(m_made));
-  }
+  m_def->SetExported(m_exported);
 }
 
 void EnumStatement::ParseForward() {
@@ -169,31 +159,23 @@ void EnumStatement::ParseForward() {
   } else {
     m_parser.out << "enum " << m_def->name << " : int;\n";
   }
-  if (!m_old) Enter();
+  if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
   m_parser.Flush();
   m_parser.DropBehindCurrent();
 }
 
 void EnumStatement::ReadQualifiers() {
-  for (; !m_parser.Accept(kShiftRight); m_parser.Advance()) {
-    const bool on = !m_parser.Accept(kMinus);
-    if (m_parser.Is("extern")) {
-      m_def->m_extern = on ? TriState::On : TriState::Off;
-    } else if (m_parser.Is("reflect")) {
-      m_def->m_reflected = on;
-      if (!on) m_def->m_registered = false;
-    } else if (m_parser.Is("register")) {
-      m_def->m_registered = on;
-      if (on) m_def->m_reflected = true;
-    } else {
-      m_parser.Fail("Unrecognised qualifier << " + Printed(m_parser.current) + " >> on " + PrintedElement(*m_def));
-    }
-  }
+  m_parser.ParseQualifierFlags(m_def->m_reflected, m_def->m_registered, " >> on " + PrintedElement(*m_def),
+                               [this](bool on) {
+                                 if (!m_parser.Is("extern")) return false;
+                                 m_def->m_extern = on ? TriState::On : TriState::Off;
+                                 return true;
+                               });
 }
 
 void EnumStatement::FillValues(size_t count) {
   std::vector<int64_t>& values = m_def->m_values;
-  while (values.size() < count) values.push_back(values.empty() ? 0 : static_cast<int32_t>(values.back() + 1));
+  while (values.size() < count) values.push_back(values.empty() ? 0 : values.back() + 1);
 }
 
 void EnumStatement::ReadEntry() {
@@ -220,18 +202,16 @@ void EnumStatement::ReadEntries() {
     if (!m_parser.Accept(kComma)) m_parser.FailExpected(", or }");
   }
   if (!m_def->m_values.empty()) FillValues(m_def->m_labels.size());
-  // A default in front of nothing has no value of its own.
-  if (m_def->m_defaultIndex >= m_def->m_labels.size()) m_def->m_defaultIndex = 0;
 }
 
 void EnumStatement::Parse() {
   ReadHeading();
   if (m_parser.Is(kSemicolon)) return ParseForward();
   m_def->status = DeclStatus::Defined;
-  Enter();
+  m_parser.Enter(std::move(m_made), m_enclosing);
   m_parser.CheckPublicHeader(*m_def);
   if (m_old && m_old->status == DeclStatus::Defined) m_parser.FailRepeated(*m_old, *m_def);
-  if (m_parser.Accept(kShiftLeft)) ReadQualifiers();
+  if (m_parser.Is(kShiftLeft)) ReadQualifiers();
   if (m_parser.Accept(kColon)) m_parser.ParseMetadataList(m_def->metadata);
   m_parser.Expect(kOpenBrace, "{");
   ReadEntries();
@@ -241,10 +221,7 @@ void EnumStatement::Parse() {
   m_parser.Flush();
   m_parser.CheckMetadata(*m_def);
   m_parser.Advance();
-  if (!m_parser.Is(kSemicolon)) {
-    m_parser.Fail("; expected after definition of " + PrintedElement(*m_def) + " when read " +
-                  Printed(m_parser.current));
-  }
+  m_parser.RequireSemicolonAfter(*m_def);
   m_parser.DropBehindCurrent();
 }
 

@@ -74,17 +74,16 @@ void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
 
 }  // namespace
 
-void ParseFunctor(QrexParser& parser) {
+void ParseFunctor(QrexParser& parser, bool nested) {
   parser.Advance();
   auto made = std::make_unique<FunctorDef>(parser.file, parser.SourcePosition());
   FunctorDef& def = *made;
   def.parent = &parser.Current();
+  def.m_nested = nested;
   parser.ParseExportModifier(def);
   if (parser.Is(kShiftLeft)) {
     parser.ParseQualifiers(def);
-    if (!def.m_reflected) {
-      parser.ReportWarning(1004, PrintedElement(def) + " is not reflected and has redundant << >> directives", &def);
-    }
+    parser.CheckRedundant(def);
   }
   parser.ParseFunctionSignature(def.signature, false, false, false, def.m_reflected);
   def.name = def.signature.name;
@@ -92,13 +91,14 @@ void ParseFunctor(QrexParser& parser) {
   if (NameSpaceElement* found = parser.Current().Lookup(def.name)) parser.FailConflict("functor", def.name, *found);
   def.ForgetQualifiedName();
   parser.Current().Add(std::move(made));
+  parser.CheckPublicHeader(def);
   parser.DropToCurrent();
-  if (!parser.Is(kSemicolon)) {
-    parser.Fail("; expected after definition of " + PrintedElement(def) + " when read " + Printed(parser.current));
-  }
+  parser.RequireSemicolonAfter(def);
   WriteFunctorClass(parser.out, def);
-  WriteTypeTraits(parser.out, def);
+  if (!def.m_nested) WriteTypeTraits(parser.out, def);
   parser.Flush();
+  parser.CheckReferences(def);
+  parser.CheckMetadata(def);
 }
 
 // --- Instances

@@ -24,7 +24,7 @@ class FunctorDef : public NameSpaceElement {
   FunctionSignature signature;
 };
 
-void ParseFunctor(QrexParser& parser);
+void ParseFunctor(QrexParser& parser, bool nested);
 void ParseMakeFunctor(QrexParser& parser);  // the keyword tells the const form
 
 }  // namespace qrex

@@ -90,8 +90,10 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
   if (!def.signature.isInline) parser.out << ExportPrefix(def);
   WriteSignature(parser.out, def.signature);
   if (old && parser.WarningOn(1010) && !SameSignature(def, *old)) {
-    parser.ReportWarning(1010, PrintedElement(def) + " declarations have inconsistent signatures :\n    " +
-                                   SignatureText(def.signature) + "\n    " + SignatureText(old->signature) + "\n");
+    parser.ReportWarning(1010,
+                         PrintedElement(def) + " declarations have inconsistent signatures :\n    " +
+                             SignatureText(def.signature) + "\n    " + SignatureText(old->signature) + "\n",
+                         &def);
     parser.SeeDeclaration(*old);
   }
   if (parser.Is(kSemicolon)) {
@@ -102,7 +104,7 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
     parser.DropBehindCurrent();
     if (polymorphic) {
       parser.out << "\n";
-      WriteDispatchBody(parser.out, def);
+      WriteDispatchBody(parser, def);
       def.status = DeclStatus::Defined;
     } else {
       parser.out << ";";
@@ -132,9 +134,12 @@ struct DeclaredFlags {
     parser.RequireIObjectImport();
     parser.Advance();
     exported = reflected = registered = parser.ParseExportModifier();
-    if (parser.Is(kShiftLeft)) {
-      parser.ParseQualifierFlags(reflected, registered, " >> on $typedef", externAllowed ? &isExtern : nullptr);
-    }
+    if (!parser.Is(kShiftLeft)) return;
+    parser.ParseQualifierFlags(reflected, registered, " >> on $typedef", [&](bool on) {
+      if (!externAllowed || !parser.Is("extern")) return false;
+      isExtern = on;
+      return true;
+    });
   }
 
   void Set(NameSpaceElement& element) const {
@@ -153,37 +158,39 @@ void CopyToSemicolon(QrexParser& parser, const std::string& atEnd, const char* p
   parser.CopyTo(parser.current.text.end);
 }
 
-// The type without the array suffixes that stand behind the name: the source's own are copied.
-std::string_view WithoutArrays(std::string_view type) {
-  for (;;) {
-    type = SkipMetadata(type);
-    const uint8_t op = static_cast<uint8_t>(type.front());
-    if (op == kOpArray) {
-      type = ArrayElement(type);
-    } else if (op == kOpDynArray) {
-      type.remove_prefix(1);
-    } else {
-      return type;
-    }
-  }
-}
+// Type and name of a $var or $typedef.
+struct Declaration {
+  TypeCode type;
+  std::string name;
+  const char* begin;    // of the type
+  const char* nameEnd;  // what stands behind the name is copied as it is
+  size_t suffixSize;    // of the array suffixes behind the name
 
-// Reads type and name. `nameEnd`: behind the name as read. False when no type stands here.
-bool ReadTypeAndName(QrexParser& parser, TypeCode& type, std::string& name, bool reflected, const char*& nameEnd) {
-  // The name's end is found on a copy: the suffixes behind it belong to the type.
-  if (!parser.ParseTypeWithName(type, &name, true, nullptr, reflected)) return false;
-  nameEnd = parser.lastNameEnd;
-  return true;
-}
+  Declaration(QrexParser& parser, bool reflected, std::string_view what) : begin(parser.current.text.begin) {
+    if (!parser.ParseTypeWithName(type, &name, true, nullptr, reflected)) {
+      parser.Fail(std::string(what) + " expected when read " + Printed(parser.current));
+    }
+    nameEnd = parser.lastNameEnd;
+    suffixSize = parser.lastSuffixSize;
+  }
+
+  // "T name" without the array suffixes: the source's own are copied.
+  void WriteTo(QrexParser& parser, std::string_view prefix) const {
+    parser.out << prefix << TypeText(std::string_view(type).substr(suffixSize)) << " " << name;
+    parser.Flush();
+  }
+};
 
 template <typename Def>
-Def& AddDeclared(QrexParser& parser, const DeclaredFlags& flags, TypeCode type, const std::string& name,
+Def& AddDeclared(QrexParser& parser, const DeclaredFlags& flags, const Declaration& declaration,
                  std::string_view keyword) {
-  if (NameSpaceElement* found = parser.Current().Lookup(name)) parser.FailConflict(keyword, name, *found);
+  if (NameSpaceElement* found = parser.Current().Lookup(declaration.name)) {
+    parser.FailConflict(keyword, declaration.name, *found);
+  }
   auto made = std::make_unique<Def>(parser.file, parser.SourcePosition());
   Def& def = *made;
-  def.name = name;
-  def.type = std::move(type);
+  def.name = declaration.name;
+  def.type = declaration.type;
   flags.Set(def);
   parser.Current().Add(std::move(made));
   return def;
@@ -194,45 +201,24 @@ Def& AddDeclared(QrexParser& parser, const DeclaredFlags& flags, TypeCode type, 
 void ParseGlobalVar(QrexParser& parser) {
   DeclaredFlags flags;
   flags.Read(parser, false);
-  const char* const position = parser.current.text.begin;
-  TypeCode type;
-  std::string name;
-  const char* nameEnd = nullptr;
-  if (!ReadTypeAndName(parser, type, name, flags.reflected, nameEnd)) {
-    parser.Fail("Variable declaration expected when read " + Printed(parser.current));
-  }
-  const auto& def = AddDeclared<GlobalVarDef>(parser, flags, type, name, "var");
-  parser.CheckNotExported(def);
-  PrintType(parser.out, WithoutArrays(def.type));
-  parser.out << " " << name;
-  parser.Flush();
-  parser.DropTo(nameEnd);
-  CopyToSemicolon(parser, "Missing semicolon after definition of variable " + name, position);
+  const Declaration declaration(parser, flags.reflected, "Variable declaration");
+  parser.CheckNotExported(AddDeclared<GlobalVarDef>(parser, flags, declaration, "var"));
+  declaration.WriteTo(parser, "");
+  parser.DropTo(declaration.nameEnd);
+  CopyToSemicolon(parser, "Missing semicolon after definition of variable " + declaration.name, declaration.begin);
 }
 
 void ParseTypedef(QrexParser& parser) {
   DeclaredFlags flags;
   flags.Read(parser, true);
-  const char* const position = parser.current.text.begin;
-  TypeCode type;
-  std::string name;
-  const char* nameEnd = nullptr;
-  if (!ReadTypeAndName(parser, type, name, flags.reflected, nameEnd)) {
-    parser.Fail("Type expected when read " + Printed(parser.current));
-  }
-  const auto& def = AddDeclared<TypedefDef>(parser, flags, type, name, "typedef");
-  parser.CheckNotInPublicHeader(def);
-  parser.CheckNotExported(def);
-  if (!flags.isExtern) {
-    parser.out << "typedef ";
-    PrintType(parser.out, WithoutArrays(def.type));
-    parser.out << " " << name;
-  }
-  parser.Flush();
-  parser.DropTo(nameEnd);
+  const Declaration declaration(parser, flags.reflected, "Type");
+  const auto& def = AddDeclared<TypedefDef>(parser, flags, declaration, "typedef");
+  parser.CheckPublicHeader(def);
+  if (!flags.isExtern) declaration.WriteTo(parser, "typedef ");
+  parser.DropTo(declaration.nameEnd);
   parser.CheckMetadata(def);
-  CopyToSemicolon(parser, "Missing semicolon after typedef " + name, position);
-  parser.out << "\ninline vesk::ConstStringZ GetTypedefName_" << name << "()\n";
+  CopyToSemicolon(parser, "Missing semicolon after typedef " + declaration.name, declaration.begin);
+  parser.out << "\ninline vesk::ConstStringZ GetTypedefName_" << def.name << "()\n";
   {
     Block body(parser.out);
     parser.out << "return \"" << def.GetQualifiedName() << "\";\n";

@@ -164,7 +164,7 @@ class InterfaceStatement {
     MakeElement();
     if (m_parser.Is(kSemicolon)) return ParseForward();
     if (m_old && m_old->status == DeclStatus::Defined) m_parser.FailRepeated(*m_old, *m_def);
-    Enter();
+    m_parser.Enter(std::move(m_made), m_enclosing);
     m_parser.CheckPublicHeader(*m_def);
     ReadQualifiers();
     if (m_parser.Accept(kColon)) ReadBases();
@@ -174,10 +174,7 @@ class InterfaceStatement {
     m_def->status = DeclStatus::Defined;
     WriteText();
     m_parser.Advance();
-    if (!m_parser.Is(kSemicolon)) {
-      m_parser.Fail("; expected after definition of " + PrintedElement(*m_def) + " when read " +
-                    Printed(m_parser.current));
-    }
+    m_parser.RequireSemicolonAfter(*m_def);
     AddDelegatorMixin();
     m_parser.CheckReferences(*m_def);
     m_parser.CheckMetadata(*m_def);
@@ -188,7 +185,6 @@ class InterfaceStatement {
   void ReadModifiers();
   void MakeElement();
   void ParseForward();
-  void Enter();
   void ReadQualifiers();
   void ReadBases();
   void CheckBases();
@@ -232,33 +228,22 @@ void InterfaceStatement::MakeElement() {
   m_def->name = name;
   m_def->parent = &m_parser.Current();
   m_def->m_nested = m_enclosing != nullptr;
-  m_def->m_exported = m_def->m_reflected = m_def->m_registered = m_def->m_strict = m_exported;
+  m_def->SetExported(m_exported);
   m_def->m_isIpc = m_ipc;
   m_def->m_isRmi = m_rmi;
 }
 
 void InterfaceStatement::ParseForward() {
   m_parser.out << "struct " << m_def->name << ";\n";
-  if (!m_old) Enter();
+  if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
   m_parser.Flush();
   m_parser.DropBehindCurrent();
-}
-
-void InterfaceStatement::Enter() {
-  if (m_enclosing) {
-    m_enclosing->m_ownedElements.push_back(std::move(m_made));
-  } else {
-    m_parser.Current().Add(std::move(m_made));
-  }
 }
 
 void InterfaceStatement::ReadQualifiers() {
   if (!m_parser.Is(kShiftLeft)) return;
   m_parser.ParseQualifiers(*m_def);
-  if (!m_def->m_reflected) {
-    m_parser.ReportWarning(1004, PrintedElement(*m_def) + " is not reflected and has redundant << >> directives",
-                           m_def);
-  }
+  m_parser.CheckRedundant(*m_def);
 }
 
 void InterfaceStatement::ReadBases() {

@@ -4,6 +4,7 @@
 #include <unordered_set>
 
 #include "text/numbers.h"
+#include "translator/class_def.h"
 #include "translator/qrex_parser.h"
 
 namespace qrex {
@@ -48,12 +49,10 @@ bool QrexParser::ParseExportModifier() {
   return true;
 }
 
-void QrexParser::ParseExportModifier(NameSpaceElement& element) {
-  const bool exported = ParseExportModifier();
-  element.m_exported = element.m_reflected = element.m_registered = element.m_strict = exported;
-}
+void QrexParser::ParseExportModifier(NameSpaceElement& element) { element.SetExported(ParseExportModifier()); }
 
-void QrexParser::ParseQualifierFlags(bool& reflected, bool& registered, std::string_view onWhat, bool* isExtern) {
+void QrexParser::ParseQualifierFlags(bool& reflected, bool& registered, std::string_view onWhat,
+                                     const std::function<bool(bool on)>& acceptOther) {
   Advance();
   while (!Accept(kShiftRight)) {
     const bool on = !Accept(kMinus);
@@ -63,9 +62,7 @@ void QrexParser::ParseQualifierFlags(bool& reflected, bool& registered, std::str
     } else if (Is("register")) {
       registered = on;
       if (on) reflected = true;
-    } else if (isExtern && Is("extern")) {
-      *isExtern = on;
-    } else {
+    } else if (!acceptOther || !acceptOther(on)) {
       Fail("Unrecognised qualifier << " + Printed(current) + std::string(onWhat));
     }
     Advance();
@@ -85,6 +82,19 @@ void QrexParser::FailConflict(std::string_view keyword, std::string_view name, c
 void QrexParser::FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element) {
   SeeDeclaration(old);
   Fail("Repeated definition of " + PrintedElement(element));
+}
+
+void QrexParser::Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* enclosing) {
+  if (enclosing) {
+    enclosing->m_ownedElements.push_back(std::move(element));
+  } else {
+    Current().Add(std::move(element));
+  }
+}
+
+void QrexParser::RequireSemicolonAfter(const NameSpaceElement& element) {
+  if (Is(kSemicolon)) return;
+  Fail("; expected after definition of " + PrintedElement(element) + " when read " + Printed(current));
 }
 
 void QrexParser::SeeDeclaration(const NameSpaceElement& element) {
@@ -133,6 +143,11 @@ void QrexParser::CheckMetadata(const NameSpaceElement& element) {
   if (!element.m_reflected && element.ContainsMetaData()) {
     ReportWarning(1001, "Non-reflected " + PrintedElement(element) + " contains metadata", &element);
   }
+}
+
+void QrexParser::CheckRedundant(const NameSpaceElement& element) {
+  if (element.m_reflected) return;
+  ReportWarning(1004, PrintedElement(element) + " is not reflected and has redundant << >> directives", &element);
 }
 
 void QrexParser::CheckReferences(const NameSpaceElement& element) {

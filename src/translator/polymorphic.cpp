@@ -8,12 +8,23 @@ namespace qrex {
 
 namespace {
 
+constexpr size_t kMaxLeaves = 100000;
+
 // One level per polymorphic argument; each has a case per item of its variant.
 class Dispatch {
  public:
-  Dispatch(TextWriter& out, const GlobalFunctionDef& def) : m_out(out), m_def(def) {
+  Dispatch(QrexParser& parser, const GlobalFunctionDef& def)
+      : m_out(parser.out), m_def(def), m_isVoid(IsVoid(def.signature.returnType)) {
+    size_t leaves = 1;
     for (const FunctionArg& argument : def.signature.arguments) {
-      if (argument.polymorphic) m_levels.push_back({&argument, VariantOf(argument), 0});
+      if (!argument.polymorphic) continue;
+      const VariantDef* variant = VariantOf(argument);
+      if (!variant || variant->m_items.empty()) {
+        parser.Fail("Polymorphic argument " + argument.name + " is not a defined $variant");
+      }
+      m_levels.push_back({&argument, variant, 0});
+      leaves *= variant->m_items.size();
+      if (leaves > kMaxLeaves) parser.Fail("Too many combinations of polymorphic arguments");
     }
   }
 
@@ -40,41 +51,42 @@ class Dispatch {
 
   void WriteLevel(size_t depth) {
     Level& level = m_levels[depth];
+    const bool isLast = depth + 1 == m_levels.size();
     IndentScope indent(m_out, 4);
     m_out << "switch(" << level.argument->name << ".GetTag())\n{\n";
-    const size_t count = level.variant ? level.variant->m_items.size() : 0;
-    for (level.item = 0; level.item < count; ++level.item) {
-      if (depth + 1 == m_levels.size()) {
-        WriteLeaf(level.item);
+    for (level.item = 0; level.item < level.variant->m_items.size(); ++level.item) {
+      m_out << "case " << level.item << (isLast ? " : " : " :\n");
+      if (isLast) {
+        WriteCall();
       } else {
-        m_out << "case " << level.item << " :\n";
         WriteLevel(depth + 1);
       }
     }
     m_out << "default: vxAssertUnreachable();\n}\n";
   }
 
-  void WriteLeaf(size_t item) {
-    const bool isVoid = IsVoid(m_def.signature.returnType);
-    m_out << "case " << item << " : " << (isVoid ? "" : "return ") << m_def.name << "(";
-    size_t depth = 0;
+  // Of the overload for the items that the levels stand at.
+  void WriteCall() {
+    m_out << (m_isVoid ? "" : "return ") << m_def.name << "(";
+    auto level = m_levels.begin();
     for (const FunctionArg& argument : m_def.signature.arguments) {
       if (&argument != &m_def.signature.arguments.front()) m_out << ",";
       m_out << argument.name;
       if (!argument.polymorphic) continue;
-      const Level& level = m_levels[depth++];
-      m_out << ".as<" << level.variant->m_items[level.item]->EffectiveName() << ">()";
+      m_out << ".as<" << level->variant->m_items[level->item]->EffectiveName() << ">()";
+      ++level;
     }
-    m_out << ");" << (isVoid ? " break;\n" : "\n");
+    m_out << (m_isVoid ? "); break;\n" : ");\n");
   }
 
   TextWriter& m_out;
   const GlobalFunctionDef& m_def;
+  const bool m_isVoid;
   std::vector<Level> m_levels;
 };
 
 }  // namespace
 
-void WriteDispatchBody(TextWriter& out, const GlobalFunctionDef& def) { Dispatch(out, def).Write(); }
+void WriteDispatchBody(QrexParser& parser, const GlobalFunctionDef& def) { Dispatch(parser, def).Write(); }
 
 }  // namespace qrex

@@ -5,6 +5,7 @@
 
 namespace qrex {
 
-void WriteDispatchBody(TextWriter& out, const GlobalFunctionDef& def);
+// Fails at the current token when an argument in [ ] is no defined variant.
+void WriteDispatchBody(QrexParser& parser, const GlobalFunctionDef& def);
 
 }  // namespace qrex

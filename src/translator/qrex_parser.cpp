@@ -204,10 +204,8 @@ void QrexParser::SkipAngles() {
 
 // --- $new, $init, $uninit
 
-void ParseNew(QrexParser& parser) {
-  parser.DropBehindCurrent();
+void SkipNewExpression(QrexParser& parser) {
   parser.Advance();
-  parser.out << "vesk::DollarNew(new";
   do {
     parser.RequireIdentifier();
     while (parser.Is(kOpenParen) || parser.Is(kLess)) {
@@ -219,6 +217,12 @@ void ParseNew(QrexParser& parser) {
       parser.Advance();
     }
   } while (parser.Accept(kColonColon));
+}
+
+void ParseNew(QrexParser& parser) {
+  parser.DropBehindCurrent();
+  parser.out << kDollarNew;
+  SkipNewExpression(parser);
   parser.CopyToCurrent();
   parser.out << ")";
   parser.Flush();

@@ -9,6 +9,8 @@
 
 #include <array>
 #include <cstdint>
+#include <functional>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -21,6 +23,8 @@
 #include "translator/type_code.h"
 
 namespace qrex {
+
+class ClassDef;
 
 // Receives the generated text, and keeps for each generated line the source position that it came from: that of the
 // last source text copied, so that a compiler's error in generated text points at the declaration which produced it.
@@ -78,10 +82,15 @@ class QrexParser : public ExpressionParser {
   void ParseExportModifier(NameSpaceElement& element);
   bool ParseExportModifier();                       // the bare `+`
   void ParseQualifiers(NameSpaceElement& element);  // << >> of functions, functors and interfaces; `<<` is current
-  // As above for local flags; `onWhat` ends the failure text (" >> on $type").
-  void ParseQualifierFlags(bool& reflected, bool& registered, std::string_view onWhat, bool* isExtern = nullptr);
+  // As above for given flags; `onWhat` ends the failure text (" >> on $type"). `acceptOther` is asked about words that
+  // are neither `reflect` nor `register`; false: the word is not known.
+  void ParseQualifierFlags(bool& reflected, bool& registered, std::string_view onWhat,
+                           const std::function<bool(bool on)>& acceptOther = nullptr);
   [[noreturn]] void FailConflict(std::string_view keyword, std::string_view name, const NameSpaceElement& old);
   [[noreturn]] void FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element);
+  // Into the current name space, or into the class that encloses it.
+  void Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* enclosing);
+  void RequireSemicolonAfter(const NameSpaceElement& element);  // "; expected after definition of ..."
   void SeeDeclaration(const NameSpaceElement& element);
   void RequireIObjectImport();  // "@import of IObject.h required"
 
@@ -107,6 +116,7 @@ class QrexParser : public ExpressionParser {
   void CheckNotInPublicHeader(const NameSpaceElement& element);  // W1008
   void CheckReferences(const NameSpaceElement& element);         // W1002
   void CheckMetadata(const NameSpaceElement& element);           // W1001: non-reflected with metadata
+  void CheckRedundant(const NameSpaceElement& element);          // W1004: non-reflected with a list that needs it
 
   const char* SourcePosition() {
     out.Flush();
@@ -118,6 +128,7 @@ class QrexParser : public ExpressionParser {
   const Project& GetProject() const { return *file.file.project; }
 
   const char* lastNameEnd = nullptr;  // behind the name that ParseTypeWithName read last
+  size_t lastSuffixSize = 0;          // of the part of its code that stands for the arrays behind the name
   int nesting = 0;                    // of declarations inside declarations, see NestingGuard
   ScannedFile& file;
   QrexParserOutputStream& stream;
@@ -171,6 +182,9 @@ void TranslateFile(ScannedFile& file, IOutputStream& target);
 
 // Handlers that other kinds call inside their bodies.
 void ParseNew(QrexParser& parser);
+void SkipNewExpression(QrexParser& parser);  // from `new` to behind the expression
+inline constexpr std::string_view kDollarNew = "vesk::DollarNew(new";
+inline constexpr std::string_view kDollarThis = "this->GetThisAsFinalClass()";
 void ParseInit(QrexParser& parser);
 void ParseUninit(QrexParser& parser);
 void ParseWarning(QrexParser& parser);

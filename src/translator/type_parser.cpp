@@ -209,7 +209,9 @@ bool QrexParser::ParseTypeWithName(TypeCode& type, std::string* name, bool nameR
     dimension = ParseArraySuffix();
   }
   if (isReference) type += static_cast<char>(kOpReference);
-  type += dimensions + dimension + base;
+  dimensions += dimension;
+  lastSuffixSize = isReference ? 0 : dimensions.size();
+  type += dimensions + base;
   return true;
 }
 

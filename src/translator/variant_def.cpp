@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "translator/byte_code.h"
+#include "translator/class_parser.h"
 #include "translator/emit.h"
 #include "translator/records.h"
 
@@ -118,7 +119,6 @@ class VariantStatement {
 
  private:
   void ReadHeading();
-  void Enter();
   void ReadQualifiers();
   void ReadBody();
   void ReadDefault();
@@ -136,9 +136,8 @@ class VariantStatement {
 
 void VariantStatement::ReadHeading() {
   m_parser.Advance();
-  const LexToken plus = m_parser.current;
   m_exported = m_parser.ParseExportModifier();
-  if (m_exported && m_enclosing) throw LexScannerException("'+' modifier not permitted on nested variant", plus);
+  if (m_exported && m_enclosing) m_parser.Fail("'+' modifier not permitted on nested variant");
   const std::string name = m_parser.RequireIdentifier();
   if (!m_enclosing) {
     if (NameSpaceElement* found = m_parser.Current().Lookup(name)) {
@@ -151,58 +150,20 @@ void VariantStatement::ReadHeading() {
   m_def->name = name;
   m_def->parent = &m_parser.Current();
   m_def->m_nested = m_enclosing != nullptr;
-  m_def->m_exported = m_def->m_reflected = m_def->m_registered = m_def->m_strict = m_exported;
-}
-
-void VariantStatement::Enter() {
-  if (m_enclosing) {
-    m_enclosing->m_ownedElements.push_back(std::move(m_made));
-  } else {
-    m_parser.Current().Add(std::move(m_made));
-  }
+  m_def->SetExported(m_exported);
 }
 
 void VariantStatement::ReadQualifiers() {
-  struct Word {
-    std::string_view word;
-    TriState ClassQualifiers::*state;
-    bool needsReflection;
-  };
-  using Q = ClassQualifiers;
-  static constexpr Word kWords[] = {
-      {"copy", &Q::copy, true},
-      {"compare", &Q::compare, true},
-      {"print", &Q::print, true},
-      {"ser", &Q::ser, true},
-      {"os", &Q::os, false},
-      {"ar", &Q::ar, false},
-      {"extern", &Q::extern_, false},
-      {"passbyvalue", &Q::passbyvalue, true},
-      {"returnbyvalue", &Q::returnbyvalue, true},
-      {"multiline", &Q::multiline, false},
-  };
   bool redundant = false;
-  for (; !m_parser.Accept(kShiftRight); m_parser.Advance()) {
-    const bool on = !m_parser.Accept(kMinus);
-    const auto* word = std::find_if(std::begin(kWords), std::end(kWords),
-                                    [&](const Word& candidate) { return m_parser.Is(candidate.word); });
-    if (word != std::end(kWords)) {
-      m_def->qualifiers.*word->state = on ? TriState::On : TriState::Off;
-      redundant = redundant || word->needsReflection;
-    } else if (m_parser.Is("reflect")) {
-      m_def->m_reflected = on;
-      if (!on) m_def->m_registered = false;
-    } else if (m_parser.Is("register")) {
-      m_def->m_registered = on;
-      if (on) m_def->m_reflected = true;
-    } else {
-      m_parser.Fail("Unrecognised qualifier << " + Printed(m_parser.current) + " >> on " + PrintedElement(*m_def));
-    }
-  }
-  if (redundant && !m_def->m_reflected) {
-    m_parser.ReportWarning(1004, PrintedElement(*m_def) + " is not reflected and has redundant << >> directives",
-                           m_def);
-  }
+  m_parser.ParseQualifierFlags(m_def->m_reflected, m_def->m_registered, " >> on " + PrintedElement(*m_def),
+                               [&](bool on) {
+                                 const QualifierWord* word = FindQualifierWord(m_parser.current.text.View());
+                                 if (!word || !word->onVariant) return false;
+                                 m_def->qualifiers.*word->state = on ? TriState::On : TriState::Off;
+                                 redundant = redundant || word->needsReflection;
+                                 return true;
+                               });
+  if (redundant) m_parser.CheckRedundant(*m_def);
 }
 
 void VariantStatement::ReadDefault() {
@@ -279,10 +240,7 @@ void VariantStatement::ReadBody() {
     while (!m_parser.Is(kDollar) && !m_parser.Is(kDollarDollar) && !m_parser.Is(kCloseBrace)) ReadItem();
     if (m_def->m_items.empty()) m_parser.Fail(PrintedElement(*m_def) + " is empty");
     m_parser.Expect(kCloseBrace, "}");
-    if (!m_parser.Is(kSemicolon)) {
-      m_parser.Fail("; expected after definition of " + PrintedElement(*m_def) + " when read " +
-                    Printed(m_parser.current));
-    }
+    m_parser.RequireSemicolonAfter(*m_def);
     m_def->status = DeclStatus::Defined;
     out << "\n";
     WriteVariantBody(out, *m_def);
@@ -293,14 +251,14 @@ void VariantStatement::Parse() {
   ReadHeading();
   if (m_parser.Is(kSemicolon)) {
     m_parser.out << "class " << m_def->name << ";\n";
-    if (!m_old) Enter();
+    if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
     m_parser.Flush();
     return m_parser.DropBehindCurrent();
   }
-  Enter();
+  m_parser.Enter(std::move(m_made), m_enclosing);
   m_parser.CheckPublicHeader(*m_def);
   if (m_old && m_old->status == DeclStatus::Defined) m_parser.FailRepeated(*m_old, *m_def);
-  if (m_parser.Accept(kShiftLeft)) ReadQualifiers();
+  if (m_parser.Is(kShiftLeft)) ReadQualifiers();
   if (m_parser.Accept(kColon)) m_parser.ParseMetadataList(m_def->metadata);
   ReadBody();
   WriteVariantTail(m_parser.out, *m_def);
