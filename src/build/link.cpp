@@ -1,12 +1,12 @@
 // Linker, librarian, manifest tool.
 
 #include <algorithm>
+#include <set>
 
 #include "build/run_command.h"
 #include "build/tools.h"
 #include "text/files.h"
 #include "text/numbers.h"
-#include "text/output_policy.h"
 #include "text/paths.h"
 #include "workspace/linker_text.h"
 
@@ -14,32 +14,38 @@ namespace qrex {
 
 namespace {
 
-std::string GccTargetName(const Project& project) {
-  switch (project.targetType) {
-    case TargetType::StaticLibrary:
-      return "lib" + project.name + ".a";
-    case TargetType::DynamicLinkLibrary:
-      return "lib" + project.name + ".so";
-    default:
-      return project.name;
+// The libraries of the gcc family, dependents ahead of what they depend on: a walk behind the subprojects, turned
+// round. A dynamic library has what it needs linked in; a static one leaves that to its user.
+class GccLibraries {
+ public:
+  explicit GccLibraries(const Project& project) {
+    Visit(project);
+    m_order.pop_back();  // the project itself
+    std::reverse(m_order.begin(), m_order.end());
   }
-}
+  const std::vector<const Project*>& Order() const { return m_order; }
 
-// The libraries of the gcc family, dependents ahead of what they depend on.
-void AddGccLibraries(const ProjectBuilder& builder, const Project& project, std::vector<const Project*>& libraries) {
-  for (const std::string& path : project.subprojects) {
-    const Project* subproject = project.workspace->FindSubproject(path);
-    if (!subproject || !IsLibrary(subproject->targetType)) continue;
-    const bool isNew = std::find(libraries.begin(), libraries.end(), subproject) == libraries.end();
-    std::erase(libraries, subproject);  // what is needed by a later one stands behind it
-    libraries.push_back(subproject);
-    if (isNew) AddGccLibraries(builder, *subproject, libraries);
+ private:
+  void Visit(const Project& project) {
+    if (!m_seen.insert(&project).second) return;
+    const bool isFirst = m_seen.size() == 1;
+    if (isFirst || project.targetType == TargetType::StaticLibrary) {
+      for (auto path = project.subprojects.rbegin(); path != project.subprojects.rend(); ++path) {
+        const Project* subproject = project.workspace->FindSubproject(*path);
+        if (subproject && IsLibrary(subproject->targetType)) Visit(*subproject);
+      }
+    }
+    m_order.push_back(&project);
   }
-}
+
+  std::set<const Project*> m_seen;
+  std::vector<const Project*> m_order;
+};
 
 std::string GccLibraryPath(const ProjectBuilder& builder, const Project& library) {
   const std::string& root = library.exported ? library.rootDir : builder.settings.exportLib;
-  return PathJoin(PathJoin3(root, builder.config.platform, builder.config.name), GccTargetName(library));
+  const std::string target = GccTargetPath(library, builder.config);
+  return PathJoin(PathJoin3(root, builder.config.platform, builder.config.name), FileNameOf(target));
 }
 
 std::string ForConfiguration(std::string text, const ProjectConfig& config) {
@@ -71,7 +77,9 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
   std::string text;
   if (builder.project.targetType != TargetType::StaticLibrary) {
     text += "-o \"" + target + "\"";
-    if (builder.project.targetType == TargetType::DynamicLinkLibrary) text += " -shared";
+    if (builder.project.targetType == TargetType::DynamicLinkLibrary) {
+      text += " -shared \"-Wl,-soname," + std::string(FileNameOf(target)) + "\"";
+    }
   }
   for (const std::string& input : inputs) text += " \"" + input + "\"";
   if (builder.project.targetType == TargetType::StaticLibrary) return text;
@@ -99,10 +107,8 @@ std::string LinkCommand(const ProjectBuilder& builder, const std::string& target
 
 std::string TargetPath(const ProjectBuilder& builder) {
   const Project& project = builder.project;
-  const std::string name = IsGccFamily(builder.settings.compiler)
-                               ? GccTargetName(project)
-                               : project.name + "." + std::string(TargetTypeExtension(project.targetType));
-  return builder.LibraryDirectory() + "/" + name;
+  if (IsGccFamily(builder.settings.compiler)) return GccTargetPath(project, builder.config);
+  return builder.LibraryDirectory() + "/" + project.name + "." + std::string(TargetTypeExtension(project.targetType));
 }
 
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
@@ -119,9 +125,8 @@ std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   }
   if (project.targetType == TargetType::StaticLibrary) return inputs;
   if (isGcc) {
-    std::vector<const Project*> libraries;
-    AddGccLibraries(builder, project, libraries);
-    for (const Project* library : libraries) inputs.push_back(GccLibraryPath(builder, *library));
+    const GccLibraries libraries(project);
+    for (const Project* library : libraries.Order()) inputs.push_back(GccLibraryPath(builder, *library));
   } else {
     std::set<std::string> libraries;
     GatherLibraries(project, builder.config, LibraryChoice(), libraries);
@@ -134,83 +139,74 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   const std::string responseFile = builder.IntermediateDirectory() + "/linker.rsp";
   const bool isGcc = IsGccFamily(builder.settings.compiler);
   const std::string text = isGcc ? GccLinkerText(builder, target, inputs) : VisualLinkerText(builder, inputs);
+  int returnCode = 0;
+  bool linked = false;
   try {
-    ReplaceFile(responseFile, WithCarriageReturns(text));
+    const CommandFile response(responseFile, text);
+    TraceWriter() << "Linking...\n";
+    if (builder.settings.diagnostics) TraceWriter() << responseFile << " = " << text << "\n";
+    if (isGcc) DeleteFile(target);  // an archive would keep members of objects that are gone
+    CommandOptions options;
+    options.echo = builder.settings.diagnostics;
+    options.failOnNonZero = true;
+    linked = RunCommand(LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode, options);
+    if (!linked) TraceWriter() << responseFile << ": " << text << "\n";
   } catch (const FileException&) {
     TraceWriter() << "Error writing " << text << " - linking failed\n";
-    ++builder.errorCount;
-    return false;
   }
-  TraceWriter() << "Linking...\n";
-  if (builder.settings.diagnostics) TraceWriter() << responseFile << " = " << text << "\n";
-  if (isGcc) DeleteFile(target);  // an archive would keep members of objects that are gone
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.failOnNonZero = true;
-  int returnCode;
-  const bool linked = RunCommand(LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode, options);
-  if (!linked) {
-    ++builder.errorCount;
-    TraceWriter() << responseFile << ": " << text << "\n";
-  }
-  DeleteFile(responseFile);
-  return linked;
+  if (linked) return true;
+  ++builder.errorCount;
+  if (isGcc || IsAbnormalEnd(returnCode)) DeleteFile(target);  // half a target must not pass for a good one
+  return false;
 }
 
 // --- Manifest
 
 namespace {
 
+bool RunManifestCommand(const ProjectBuilder& builder, const std::string& command) {
+  CommandOptions options;
+  options.echo = builder.settings.diagnostics;
+  options.failOnNonZero = true;
+  int returnCode;
+  return RunCommand(command, returnCode, options);
+}
+
 bool UpdateManifest(const ProjectBuilder& builder) {
   const Project& project = builder.project;
   const bool isDll = project.targetType == TargetType::DynamicLinkLibrary;
   const bool isProgram =
       project.targetType == TargetType::Application || project.targetType == TargetType::ConsoleApplication;
-  const std::string_view number = isDll ? "2" : isProgram ? "1" : "0";
-  const std::string_view extension = isDll ? "dll" : isProgram ? "exe" : "";
+  const std::string name = project.name + (isDll ? ".dll" : isProgram ? ".exe" : ".");
+  const std::string_view resource = isDll ? "2" : isProgram ? "1" : "0";
   const std::string directory = builder.IntermediateDirectory();
-  const std::string responseFile = directory + "/mt.rsp";
-  MemoryTextWriter text;
-  text << "/outputresource:\"" << builder.LibraryDirectory() << "/" << project.name << "." << extension << "\";#"
-       << number << " /manifest \"./" << directory << "/" << project.name << "." << extension
-       << ".intermediate.manifest\"\n";
-  const std::string response = text.TakeText();
-  ReplaceFile(responseFile, WithCarriageReturns(response));
-  if (builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << response;
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.failOnNonZero = true;
-  int returnCode;
-  const bool updated = RunCommand("mt.exe @\"" + responseFile + "\" /nologo", returnCode, options);
-  DeleteFile(responseFile);
-  return updated;
+  const std::string text = "/outputresource:\"" + builder.LibraryDirectory() + "/" + name + "\";#" +
+                           std::string(resource) + " /manifest \"./" + directory + "/" + name +
+                           ".intermediate.manifest\"\n";
+  const CommandFile response(directory + "/mt.rsp", text);
+  if (builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
+  return RunManifestCommand(builder, "mt.exe @\"" + response.Path() + "\" /nologo");
 }
 
 // Leaves a mark of the last update beside the objects.
 bool MarkManifestTime(const ProjectBuilder& builder) {
   std::string directory;
   ReplaceChar(builder.IntermediateDirectory(), directory, '/', '\\');
-  const std::string batchFile = builder.IntermediateDirectory() + "/mtdep.bat";
-  ReplaceFile(batchFile, "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\r\n");
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.failOnNonZero = true;
-  int returnCode;
-  const bool marked = RunCommand("\"" + directory + "\\mtdep.bat\"", returnCode, options);
-  DeleteFile(batchFile);
-  return marked;
+  const CommandFile batch(builder.IntermediateDirectory() + "/mtdep.bat",
+                          "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
+  return RunManifestCommand(builder, "\"" + directory + "\\mtdep.bat\"");
 }
 
 }  // namespace
 
-bool EmbedManifest(ProjectBuilder& builder, const std::string&) {
+bool EmbedManifest(ProjectBuilder& builder) {
   if (builder.project.targetType == TargetType::StaticLibrary) return true;
   try {
     if (UpdateManifest(builder) && MarkManifestTime(builder)) return true;
-    ++builder.errorCount;
   } catch (const FileException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
   }
+  ++builder.errorCount;
   return false;
 }
 

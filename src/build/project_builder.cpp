@@ -147,6 +147,7 @@ void ProjectBuilder::ReportUnregistered() const {
 }
 
 bool ProjectBuilder::LinkIfStale() {
+  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return true;  // no target
   const std::string target = TargetPath(*this);
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
@@ -156,7 +157,9 @@ bool ProjectBuilder::LinkIfStale() {
   if (isCurrent) return true;
   if (!LinkTarget(*this, target, inputs)) return false;
   if (settings.compiler == CompilerKind::vc6 || IsGccFamily(settings.compiler)) return true;
-  return EmbedManifest(*this, target);
+  if (EmbedManifest(*this)) return true;
+  DeleteFile(target);  // a target without its manifest must not pass for a good one
+  return false;
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.

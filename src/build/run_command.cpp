@@ -2,8 +2,10 @@
 
 #include <cerrno>
 
+#include "lex/token.h"
 #include "platform/system.h"
 #include "text/files.h"
+#include "text/output_policy.h"
 #include "text/text_writer.h"
 
 namespace qrex {
@@ -13,10 +15,17 @@ namespace {
 constexpr char kOutputFile[] = "out1.txt";
 constexpr char kErrorFile[] = "out2.txt";
 
-void ReportNoInterpreter() {
+// What the interpreter answers when no tool did.
+constexpr int kNotExecutable = 126;
+constexpr int kNotFound = 127;
+constexpr int kEndedBySignal = 128;  // plus the signal
+constexpr int kLastSignal = 64;
+constexpr int kInterrupt = 2, kQuit = 3;
+
+void ReportNoInterpreter(int error) {
   TraceWriter trace;
   trace << "ERROR running command interpreter\n";
-  switch (errno) {
+  switch (error) {
     case ENOENT:
       trace << "Command interpreter cannot be found\n";
       break;
@@ -36,46 +45,81 @@ void ReportNoInterpreter() {
   }
 }
 
+std::string_view ToolOf(std::string_view command) {
+  constexpr std::string_view kInterpreter = "cmd /c ";
+  if (command.substr(0, kInterpreter.size()) == kInterpreter) command.remove_prefix(kInterpreter.size());
+  return command.substr(0, command.find(' '));
+}
+
+void ReportAbnormalEnd(std::string_view command, int returnCode) {
+  TraceWriter trace;
+  trace << "ERROR: " << ToolOf(command);
+  if (returnCode == kNotFound) {
+    trace << " was not found on PATH\n";
+  } else if (returnCode == kNotExecutable) {
+    trace << " cannot be executed\n";
+  } else {
+    trace << " was ended by signal " << returnCode - kEndedBySignal << "\n";
+  }
+}
+
+// Reads a capture file and deletes it.
+bool TakeCapture(const char* path, std::string& text) {
+  if (!LoadText(text, path, true)) return false;
+  DeleteFile(path);
+  return true;
+}
+
 }  // namespace
+
+bool IsAbnormalEnd(int returnCode) {
+  return returnCode == kNotExecutable || returnCode == kNotFound ||
+         (returnCode > kEndedBySignal && returnCode <= kEndedBySignal + kLastSignal);
+}
 
 bool RunCommand(const std::string& command, int& returnCode, const CommandOptions& options) {
   std::string line = command;
-  if (options.output) line += std::string(" 1>") + kOutputFile;
+  if (options.output) {
+    line += std::string(" 1>") + kOutputFile;
+    DeleteFile(kOutputFile);  // what an earlier run may have left is not this tool's
+  }
   if (options.errorsIntoOutput) line += " 2>&1";
-  if (options.errors) line += std::string(" 2>") + kErrorFile;
+  if (options.errors) {
+    line += std::string(" 2>") + kErrorFile;
+    DeleteFile(kErrorFile);
+  }
   if (options.echo) TraceWriter() << line << "\n";
-  auto writeCommand = [&] {
+  auto fail = [&](std::string_view message) {
     if (!options.echo) TraceWriter() << line << "\n";
+    TraceWriter() << message;
+    return false;
   };
+
   returnCode = platform::RunCommand(line);
   if (returnCode == -1) {
-    writeCommand();
-    ReportNoInterpreter();
+    const int error = errno;
+    fail("");
+    ReportNoInterpreter(error);
     return false;
   }
-  if (returnCode != 0 && options.failOnNonZero) {
-    writeCommand();
-    TraceWriter() << "Return code : " << returnCode << "\n";
-    return false;
+  if (returnCode == kEndedBySignal + kInterrupt || returnCode == kEndedBySignal + kQuit) {
+    throw LexScannerException("Interrupted while running " + std::string(ToolOf(command)), nullptr);
   }
-  if (options.output && !LoadText(*options.output, kOutputFile, true)) {
-    writeCommand();
-    TraceWriter() << "ERROR getting stdout\n";
-    return false;
-  }
-  if (options.errors && !LoadText(*options.errors, kErrorFile, true)) {
-    writeCommand();
-    TraceWriter() << "ERROR getting stderr\n";
-    return false;
-  }
-  if (options.output) DeleteFile(kOutputFile);
-  if (options.errors) DeleteFile(kErrorFile);
+  if (IsAbnormalEnd(returnCode)) ReportAbnormalEnd(command, returnCode);
+  if (returnCode != 0 && options.failOnNonZero) return fail("Return code : " + std::to_string(returnCode) + "\n");
+  if (options.output && !TakeCapture(kOutputFile, *options.output)) return fail("ERROR getting stdout\n");
+  if (options.errors && !TakeCapture(kErrorFile, *options.errors)) return fail("ERROR getting stderr\n");
   if (options.errors && !options.errors->empty()) {
-    if (options.failOnErrorText) writeCommand();
+    if (options.failOnErrorText) return fail(*options.errors + "\n");
     TraceWriter() << *options.errors << "\n";
-    return !options.failOnErrorText;
   }
   return true;
 }
+
+CommandFile::CommandFile(std::string path, std::string_view text) : m_path(std::move(path)) {
+  ReplaceFile(m_path, WithCarriageReturns(text));
+}
+
+CommandFile::~CommandFile() { DeleteFile(m_path); }
 
 }  // namespace qrex

@@ -5,7 +5,6 @@
 #include "build/run_command.h"
 #include "build/tool_output.h"
 #include "text/files.h"
-#include "text/output_policy.h"
 #include "text/paths.h"
 #include "workspace/switch_blocks.h"
 
@@ -72,39 +71,41 @@ std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file,
   return text.TakeText();
 }
 
-// Runs a compiler or assembler through a response file, and lets its output decide.
-bool RunOnResponseFile(ProjectBuilder& builder, const std::string& responseFile, const std::string& text,
-                       const std::string& command) {
-  const bool echo = builder.settings.diagnostics;
-  if (echo) TraceWriter() << responseFile << " = " << text << "\n";
+// False when the tool could not be run at all: the trace log has told why.
+bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& responseFile, const std::string& text,
+                       const std::string& command, std::string& output, int& returnCode) {
+  CommandOptions options;
+  options.echo = builder.settings.diagnostics;
+  options.output = &output;
+  options.errorsIntoOutput = IsGccFamily(builder.settings.compiler);  // where that family writes its messages
+  if (options.echo) TraceWriter() << responseFile << " = " << text << "\n";
   try {
-    ReplaceFile(responseFile, WithCarriageReturns(text));
+    const CommandFile response(responseFile, text);
+    if (RunCommand(command + " @\"" + responseFile + "\"", returnCode, options)) return true;
+    TraceWriter() << responseFile << ": " << text << "\n";
   } catch (const FileException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
-    ++builder.errorCount;
-    return false;
   }
-  const bool isGcc = IsGccFamily(builder.settings.compiler);
-  std::string output, errors;
-  CommandOptions options;
-  options.echo = echo;
-  options.output = &output;
-  int returnCode = 0;
-  options.errorsIntoOutput = isGcc;  // where that family writes its messages
-  const bool ran = RunCommand(command + " @\"" + responseFile + "\"", returnCode, options);
-  DeleteFile(responseFile);
-  if (!ran) {
-    TraceWriter() << responseFile << ": " << text << "\n";
-    return false;
-  }
+  return false;
+}
+
+// Runs a compiler or assembler and lets its output decide. The return code matters only where it says that the tool did
+// not come to its own end and, in the gcc family, that it failed without a message of the known forms. Half an object
+// must not pass for a good one in the next run.
+bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::string& responseFile,
+                const std::string& text, const std::string& command) {
   const int64_t errorsBefore = builder.errorCount;
-  bool succeeded = ScanToolOutput(builder, output);
-  if (isGcc && returnCode != 0 && builder.errorCount == errorsBefore) {
-    TraceWriter() << "Return code : " << returnCode << "\n";
+  const bool isGcc = IsGccFamily(builder.settings.compiler);
+  std::string output;
+  int returnCode = 0;
+  const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
+  if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) return true;
+  if (builder.errorCount == errorsBefore) {
+    if (isGcc && returnCode != 0) TraceWriter() << "Return code : " << returnCode << "\n";
     ++builder.errorCount;
-    succeeded = false;
   }
-  return succeeded;
+  if (!ran || isGcc || IsAbnormalEnd(returnCode)) DeleteFile(ObjectPath(builder, file));
+  return false;
 }
 
 }  // namespace
@@ -113,18 +114,18 @@ bool CompileFile(ProjectBuilder& builder, ScannedFile& scanned) {
   const ProjectFile& file = scanned.file;
   const std::string input = builder.project.usesQrex ? builder.TranslatedPath(scanned) : scanned.SourcePath();
   if (builder.settings.diagnostics) TraceWriter() << "Compiling " << file.path << "\n";
-  return RunOnResponseFile(builder, builder.IntermediateDirectory() + "/compiler.rsp",
-                           CompilerText(builder, file, input),
-                           IsGccFamily(builder.settings.compiler) ? "cmd /c gcc-4 -c" : "cmd /c cl /c");
+  return MakeObject(builder, file, builder.IntermediateDirectory() + "/compiler.rsp",
+                    CompilerText(builder, file, input),
+                    IsGccFamily(builder.settings.compiler) ? "cmd /c gcc-4 -c" : "cmd /c cl /c");
 }
 
 bool AssembleFile(ProjectBuilder& builder, ScannedFile& scanned) {
   const std::string directory = builder.IntermediateDirectory();
   if (builder.settings.diagnostics) TraceWriter() << "Assembling " << scanned.file.path << "\n";
   const std::string assembler = builder.config.platform == "Win64" ? "ml64" : "ml /coff";
-  return RunOnResponseFile(builder, directory + "/masm.rsp",
-                           " /Fo\"" + directory + "/\" \"" + builder.TranslatedPath(scanned) + "\"",
-                           "cmd /c " + assembler + " /c /Cx /nologo");
+  return MakeObject(builder, scanned.file, directory + "/masm.rsp",
+                    " /Fo\"" + directory + "/\" \"" + builder.TranslatedPath(scanned) + "\"",
+                    "cmd /c " + assembler + " /c /Cx /nologo");
 }
 
 bool CompileResource(ProjectBuilder& builder, ScannedFile& scanned) {

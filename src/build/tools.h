@@ -28,6 +28,6 @@ bool AssembleFile(ProjectBuilder& builder, ScannedFile& file);
 bool CompileResource(ProjectBuilder& builder, ScannedFile& file);
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder);
 bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs);
-bool EmbedManifest(ProjectBuilder& builder, const std::string& target);
+bool EmbedManifest(ProjectBuilder& builder);
 
 }  // namespace qrex
