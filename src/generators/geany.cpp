@@ -1,11 +1,49 @@
 #include "generators/geany.h"
 
-#include "text/exceptions.h"
-
 namespace qrex {
 
-void WriteGeanyProject(TextWriter&, const Workspace& workspace) {
-  throw ExceptionBase(workspace.name + "(1) : error : .geany files are not written yet");
+namespace {
+
+constexpr std::string_view kBuildDirectory = "/home/qdev/developer/build_gcc/build";
+constexpr std::string_view kSourceRoot = "/home/qdev/developer/_root_";
+
+}  // namespace
+
+void WriteGeanyProject(TextWriter& out, const Workspace& workspace) {
+  out << R"([indentation]
+indent_width=4
+indent_type=0
+indent_hard_tab_width=8
+detect_indent=false
+detect_indent_width=false
+indent_mode=2
+
+[project]
+name=)"
+      << workspace.name << R"(
+base_path=)"
+      << kBuildDirectory << R"(
+description=
+file_patterns=
+
+[long line marker]
+long_line_behaviour=1
+long_line_column=72
+
+[files]
+current_page=0
+)";
+  size_t count = 0;
+  for (const ProjectFile* file : workspace.projects.front()->files) {
+    if (file->kind != FileKind::C && file->kind != FileKind::Cpp) continue;
+    out << "FILE_NAME_" << count++ << "=0;C++;0;16;0;1;0;" << kSourceRoot << "/" << file->path << ";0;4\n";
+  }
+  out << R"(
+[build-menu]
+NF_00_LB=_Make
+NF_00_CM=make
+NF_00_WD=)"
+      << kBuildDirectory << "\n";
 }
 
 }  // namespace qrex

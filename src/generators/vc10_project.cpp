@@ -1,15 +1,487 @@
 #include "generators/vc10_project.h"
 
-#include "text/exceptions.h"
+#include <algorithm>
+#include <optional>
+#include <span>
+#include <vector>
+
+#include "generators/common.h"
+#include "generators/vs_common.h"
+#include "text/numbers.h"
+#include "text/paths.h"
+#include "workspace/switch_tables.h"
 
 namespace qrex {
 
-void WriteVc10Project(TextWriter&, Project& project, bool) {
-  throw ExceptionBase(project.filePath + "(1) : error : .vcxproj files are not written yet");
+namespace {
+
+constexpr std::string_view kHead = "<?xml version=\"1.0\" encoding=\"utf-8\"?>\n";
+constexpr std::string_view kNameSpace = "http://schemas.microsoft.com/developer/msbuild/2003";
+
+// Names that differ between the option maps and this format.
+constexpr SwitchProperty kCompilerElements[] = {
+    {"FunctionLevelLinking", "EnableFunctionLevelLinking"},
+    {"IntrinsicFunctions", "EnableIntrinsicFunctions"},
+    {"PreprocessKeepComments", "KeepComments"},
+    {"OpenMPSupport", "OpenMP"},
+    {"TreatWarningAsError", "WarnAsError"},
+    {"ObjectFileName", "ObjectFile"},
+    {"PrecompiledHeaderOutputFile", "PrecompiledHeaderFile"},
+};
+constexpr SwitchProperty kLinkerElements[] = {
+    {"NoEntryPoint", "ResourceOnlyDLL"},
+    {"LinkErrorReporting", "ErrorReporting"},
+};
+
+// General options whose values are indices.
+struct EnumeratedOption {
+  std::string_view property;
+  std::string_view element;
+  std::span<const std::string_view> names;
+};
+constexpr std::string_view kCharacterSets[] = {"NotSet", "Unicode", "MultiByte"};
+constexpr std::string_view kLibraryUses[] = {"false", "Static", "Dynamic"};
+constexpr std::string_view kWholeProgramModes[] = {"false", "true", "PGInstrument", "PGOptimize", "PGUpdate"};
+constexpr std::string_view kManagedModes[] = {"false", "true", "Pure", "Safe", "OldSyntax"};
+constexpr std::string_view kIncrementalModes[] = {"-", "false", "true"};
+constexpr EnumeratedOption kConfigurationOptions[] = {
+    {"CharacterSet", "CharacterSet", kCharacterSets},
+    {"UseOfATL", "UseOfAtl", kLibraryUses},
+    {"UseOfMFC", "UseOfMfc", kLibraryUses},
+    {"WholeProgramOptimization", "WholeProgramOptimization", kWholeProgramModes},
+};
+constexpr EnumeratedOption kManagedOption = {"ManagedExtensions", "CLRSupport", kManagedModes};
+constexpr EnumeratedOption kIncrementalOption = {"LinkIncremental", "LinkIncremental", kIncrementalModes};
+
+std::string_view ElementName(std::span<const SwitchProperty> elements, std::string_view property) {
+  const SwitchProperty* row = FindProperty(elements, property);
+  return row ? row->name : property;
 }
 
-void WriteVc10Filters(TextWriter&, Project& project, bool) {
-  throw ExceptionBase(project.filePath + "(1) : error : .vcxproj.filters files are not written yet");
+std::string_view ConfigurationType(TargetType type) {
+  static constexpr std::string_view kNames[] = {"Application", "StaticLibrary", "Application", "DynamicLibrary",
+                                                "Utility"};
+  return kNames[static_cast<size_t>(type)];
+}
+
+std::string_view ToolsVersion(CompilerKind compiler) {
+  if (compiler == CompilerKind::vc14) return "14.0";
+  return compiler == CompilerKind::vc12 ? "12.0" : "4.0";
+}
+
+std::string_view Toolset(CompilerKind compiler) {
+  if (compiler == CompilerKind::vc14) return "v140";
+  if (compiler == CompilerKind::vc12) return "v120";
+  return compiler == CompilerKind::vc11 ? "v110" : "";
+}
+
+std::string_view ItemName(const ProjectFile& file) {
+  if (file.excluded) return "None";
+  switch (file.kind) {
+    case FileKind::C:
+    case FileKind::Cpp:
+      return "ClCompile";
+    case FileKind::H:
+      return "ClInclude";
+    case FileKind::Rc:
+      return "ResourceCompile";
+    case FileKind::Asm:
+      return "CustomBuild";
+    default:
+      return "None";
+  }
+}
+
+std::string TranslatedRoot(const Project& project, bool buildPrefix) {
+  if (!IsTranslatedForm(project, buildPrefix)) return project.rootDir;
+  const ConfigSettings& settings = *project.settings;
+  if (settings.platform.empty()) return "qrexsource/$(Platform)/$(Configuration)";
+  return "qrexsource/" + settings.platform + "/" + settings.config;
+}
+
+// --- The file tree, as both texts list it
+
+struct Item {
+  std::string path;
+  std::string filter;                 // names of the folders below the root, joined by a backslash
+  const ProjectFile* file = nullptr;  // null: the project file itself
+};
+
+struct ItemList {
+  std::vector<std::string> filters;  // parents before their children
+  std::vector<Item> items;
+};
+
+void AddItems(const Project& project, const ProjectFolder& folder, const std::string& filter, const std::string& root,
+              bool buildPrefix, ItemList& list) {
+  for (const auto& subfolder : folder.subfolders) {
+    const std::string subfilter = filter.empty() ? subfolder->name : filter + "\\" + subfolder->name;
+    list.filters.push_back(subfilter);
+    if (HoldsProjectFile(project, folder, *subfolder, buildPrefix)) {
+      list.items.push_back({ProjectFileEntry(project, root), subfilter, nullptr});
+    }
+    AddItems(project, *subfolder, subfilter, root, buildPrefix, list);
+  }
+  for (const ProjectFile* file : folder.files) {
+    if (!IsLeftOut(project, *file)) list.items.push_back({PathJoin(root, file->path), filter, file});
+  }
+}
+
+ItemList ItemsOf(const Project& project, bool buildPrefix) {
+  ItemList list;
+  AddItems(project, project.rootFolder, "", TranslatedRoot(project, buildPrefix), buildPrefix, list);
+  return list;
+}
+
+// --- Writing
+
+// An element on lines of its own; what is written until the scope ends is its body.
+class Element {
+ public:
+  Element(TextWriter& out, std::string_view name, std::string_view attributes = {}) : m_out(out), m_name(name) {
+    m_out << "<" << m_name << (attributes.empty() ? "" : " ") << attributes << ">\n";
+    m_indent.emplace(m_out, 2);
+  }
+  ~Element() {
+    m_indent.reset();
+    m_out << "</" << m_name << ">\n";
+  }
+
+ private:
+  TextWriter& m_out;
+  std::string_view m_name;
+  std::optional<IndentScope> m_indent;
+};
+
+std::string Attribute(std::string_view name, std::string_view value) {
+  return std::string(name).append("=\"").append(value).append("\"");
+}
+
+std::string Condition(const ProjectConfig& config) {
+  return Attribute("Condition", "'$(Configuration)|$(Platform)'=='" + ConfigSpec(config) + "'");
+}
+
+class ProjectWriter {
+ public:
+  ProjectWriter(TextWriter& out, Project& project, bool buildPrefix)
+      : m_out(out), m_project(project), m_buildPrefix(buildPrefix) {}
+  void Write();
+
+ private:
+  void WriteConfigurations();
+  void WriteConfigurationGroup(const ProjectConfig& config);
+  void WritePropertySheets(const ProjectConfig& config);
+  void WriteOutputs(const ProjectConfig& config);
+  void WriteTools(const ProjectConfig& config);
+  void WriteCompilerTool(const ProjectConfig& config);
+  void WriteCompilerOption(const ProjectConfig& config, const std::string& property, const std::string& value);
+  void WriteResourceTool(const ProjectConfig& config);
+  void WriteLibrarianTool(const ProjectConfig& config);
+  void WriteLinkerTool(const ProjectConfig& config);
+  bool WriteLinkerOption(std::string_view property, std::string_view value);
+  void WriteFiles();
+  void WriteSource(const Item& item);
+  void WriteAssemblerFile(const Item& item);
+  void WriteReference(const std::string& subproject);
+
+  // Pieces of all tools
+  void WriteValue(std::string_view element, std::string_view value);
+  void WriteConditional(std::string_view element, const ProjectConfig& config, std::string_view value);
+  void WriteInherited(std::string_view element, std::string_view value, std::string_view separator);
+  void WriteDirectory(const OptionMap& options, const std::string& property, std::string_view element);
+  bool WriteEnumerated(const OptionMap& options, const EnumeratedOption& option);
+  void WriteIncludes(const ProjectConfig& config, std::string_view value);
+
+  TextWriter& m_out;
+  Project& m_project;
+  const bool m_buildPrefix;
+};
+
+void ProjectWriter::Write() {
+  for (const auto& config : m_project.configs) config->linkerOptions = LinkerOptions(m_project, *config);
+  m_out << kHead;
+  const std::string version(ToolsVersion(m_project.settings->compiler));
+  Element project(
+      m_out, "Project",
+      R"(DefaultTargets="Build" )" + Attribute("ToolsVersion", version) + " " + Attribute("xmlns", kNameSpace));
+  WriteConfigurations();
+  {
+    Element globals(m_out, "PropertyGroup", R"(Label="Globals")");
+    WriteValue("ProjectGuid", GuidText(m_project.guid));
+  }
+  m_out << R"(<Import Project="$(VCTargetsPath)\Microsoft.Cpp.Default.props" />
+)";
+  for (const auto& config : m_project.configs) WriteConfigurationGroup(*config);
+  m_out << R"(<Import Project="$(VCTargetsPath)\Microsoft.Cpp.props" />
+<ImportGroup Label="ExtensionSettings">
+</ImportGroup>
+)";
+  for (const auto& config : m_project.configs) WritePropertySheets(*config);
+  m_out << R"(<PropertyGroup Label="UserMacros" />
+<PropertyGroup>
+  <_ProjectFileVersion>11.0.50727.1</_ProjectFileVersion>
+</PropertyGroup>
+)";
+  for (const auto& config : m_project.configs) WriteOutputs(*config);
+  for (const auto& config : m_project.configs) WriteTools(*config);
+  WriteFiles();
+  if (!m_project.subprojects.empty()) {
+    Element references(m_out, "ItemGroup");
+    for (const std::string& subproject : m_project.subprojects) WriteReference(subproject);
+  }
+  m_out << R"(<Import Project="$(VCTargetsPath)\Microsoft.Cpp.targets" />
+<ImportGroup Label="ExtensionTargets">
+</ImportGroup>
+)";
+}
+
+void ProjectWriter::WriteConfigurations() {
+  Element group(m_out, "ItemGroup", R"(Label="ProjectConfigurations")");
+  for (const auto& config : m_project.configs) {
+    Element item(m_out, "ProjectConfiguration", Attribute("Include", ConfigSpec(*config)));
+    WriteValue("Configuration", config->name);
+    WriteValue("Platform", config->platform);
+  }
+}
+
+void ProjectWriter::WriteConfigurationGroup(const ProjectConfig& config) {
+  Element group(m_out, "PropertyGroup", Condition(config) + R"( Label="Configuration")");
+  WriteValue("ConfigurationType", ConfigurationType(m_project.targetType));
+  const std::string_view toolset = Toolset(m_project.settings->compiler);
+  if (!toolset.empty()) {
+    WriteValue("PlatformToolset", std::string(toolset) + (m_project.settings->targetXP ? "_xp" : ""));
+  }
+  for (const EnumeratedOption& option : kConfigurationOptions) WriteEnumerated(config.generalOptions, option);
+  if (!WriteEnumerated(config.generalOptions, kManagedOption)) WriteEnumerated(config.compilerOptions, kManagedOption);
+}
+
+void ProjectWriter::WritePropertySheets(const ProjectConfig& config) {
+  Element group(m_out, "ImportGroup", Condition(config) + R"( Label="PropertySheets")");
+  m_out << R"xml(<Import Project="$(UserRootDir)\Microsoft.Cpp.$(Platform).user.props")xml"
+        << R"xml( Condition="exists('$(UserRootDir)\Microsoft.Cpp.$(Platform).user.props')")xml"
+        << R"xml( Label="LocalAppDataPlatform" />)xml"
+        << "\n";
+}
+
+void ProjectWriter::WriteOutputs(const ProjectConfig& config) {
+  Element group(m_out, "PropertyGroup", Condition(config));
+  WriteDirectory(config.generalOptions, "IntermediateDirectory", "IntDir");
+  WriteDirectory(config.generalOptions, "OutputDirectory", "OutDir");
+  WriteEnumerated(config.linkerOptions, kIncrementalOption);
+  if (auto manifest = config.linkerOptions.find("GenerateManifest"); manifest != config.linkerOptions.end()) {
+    WriteValue("GenerateManifest", manifest->second == "0" || manifest->second == "false" ? "false" : "true");
+  }
+  if (m_buildPrefix) WriteValue("TargetName", m_project.name);
+}
+
+void ProjectWriter::WriteTools(const ProjectConfig& config) {
+  Element group(m_out, "ItemDefinitionGroup", Condition(config));
+  if (m_project.targetType == TargetType::UtilityProject) return;
+  WriteCompilerTool(config);
+  WriteResourceTool(config);
+  if (m_project.targetType == TargetType::StaticLibrary) {
+    WriteLibrarianTool(config);
+  } else {
+    WriteLinkerTool(config);
+  }
+}
+
+// --- Compiler and resource compiler
+
+void ProjectWriter::WriteCompilerTool(const ProjectConfig& config) {
+  Element tool(m_out, "ClCompile");
+  for (const auto& [property, value] : config.compilerOptions) WriteCompilerOption(config, property, value);
+  WriteValue("PrecompiledHeaderFile", "StdAfx.h");
+}
+
+// Properties that have no place in this format disappear silently.
+void ProjectWriter::WriteCompilerOption(const ProjectConfig& config, const std::string& property,
+                                        const std::string& value) {
+  if (FindProperty(kSignedFlags, property) || FindProperty(kFlags, property)) {
+    WriteValue(ElementName(kCompilerElements, property), value);
+  } else if (FindProperty(kEnumerated, property)) {
+    if (property == "ManagedExtensions") return;  // stands in the configuration group
+    const EnumeratedSwitch* row = FindValue(kEnumerated, property, value);
+    if (row && !row->valueName.empty()) WriteValue(property, row->valueName);
+  } else if (property == "AdditionalIncludeDirectories") {
+    WriteIncludes(config, value);
+  } else if (property == "AdditionalOptions") {
+    WriteInherited(property, value, " ");
+  } else if (FindProperty(kLists, property)) {
+    WriteInherited(property, value, ";");
+  } else if (property == "ProgramDataBaseFileName" || property == "ObjectFile" || property == "PrecompiledHeaderFile") {
+    WriteValue(ElementName(kCompilerElements, property), value);
+  }
+}
+
+void ProjectWriter::WriteResourceTool(const ProjectConfig& config) {
+  Element tool(m_out, "ResourceCompile");
+  for (const auto& [property, value] : config.resourceOptions) {
+    if (property == "AdditionalIncludeDirectories") {
+      WriteIncludes(config, value);
+    } else if (property == "PreprocessorDefinitions") {
+      WriteInherited(property, value, ";");
+    } else {
+      TraceWriter() << "todo : resource switch " << property << " = " << value << "\n";
+    }
+  }
+}
+
+// --- Librarian and linker
+
+// The list properties and the libraries, which both tools have.
+bool ProjectWriter::WriteLinkerOption(std::string_view property, std::string_view value) {
+  if (FindProperty(kLinkerLists, property) || property == "AdditionalOptions") {
+    WriteValue(property, value);
+    return true;
+  }
+  if (property != "AdditionalDependencies") return false;
+  if (!value.empty()) WriteInherited(property, value, "");
+  return true;
+}
+
+void ProjectWriter::WriteLibrarianTool(const ProjectConfig& config) {
+  Element tool(m_out, "Lib");
+  for (const auto& [property, value] : config.linkerOptions) {
+    if (FindProperty(kLibrarianFlags, property) || FindProperty(kLibrarianValues, property)) {
+      WriteValue(property, value);
+    } else if (!WriteLinkerOption(property, value)) {
+      TraceWriter() << "todo : librarian switch " << property << " = " << value << "\n";
+    }
+  }
+}
+
+void ProjectWriter::WriteLinkerTool(const ProjectConfig& config) {
+  Element tool(m_out, "Link");
+  for (const auto& [property, value] : config.linkerOptions) {
+    if (property == "LinkIncremental" || property == "GenerateManifest") continue;  // stand with the outputs
+    if (const EnumeratedSwitch* row = FindValue(kLinkerEnumerated, property, value)) {
+      if (row->valueName.empty()) {
+        TraceWriter() << "VS2012 has no mapping for linker switch " << property << " = " << value << "\n";
+      } else {
+        WriteValue(ElementName(kLinkerElements, property), row->valueName);
+      }
+    } else if (FindProperty(kLinkerFlags, property) || FindProperty(kLinkerValues, property) ||
+               property == "MapFileName") {
+      WriteValue(ElementName(kLinkerElements, property), value);
+    } else if (!WriteLinkerOption(property, value)) {
+      TraceWriter() << "todo : linker switch " << property << " = " << value << "\n";
+    }
+  }
+}
+
+// --- Files and references
+
+void ProjectWriter::WriteFiles() {
+  Element group(m_out, "ItemGroup");
+  for (const Item& item : ItemsOf(m_project, m_buildPrefix).items) {
+    const std::string_view name = item.file ? ItemName(*item.file) : "None";
+    if (name == "ClCompile") {
+      WriteSource(item);
+    } else if (name == "CustomBuild") {
+      WriteAssemblerFile(item);
+    } else {
+      m_out << "<" << name << " " << Attribute("Include", item.path) << " />\n";
+    }
+  }
+}
+
+void ProjectWriter::WriteSource(const Item& item) {
+  Element source(m_out, "ClCompile", Attribute("Include", item.path));
+  std::string_view use = "2";
+  if (!item.file->configRecords.empty()) {
+    const OptionMap& options = item.file->configRecords.front()->options;
+    if (auto found = options.find("UsePrecompiledHeader"); found != options.end()) use = found->second;
+  }
+  for (const auto& config : m_project.configs) {
+    if (use == "1") {
+      WriteConditional("PrecompiledHeaderFile", *config, "StdAfx.h");
+      WriteConditional("PrecompiledHeader", *config, "Create");
+    } else if (use == "2") {
+      WriteConditional("PrecompiledHeader", *config, "Use");
+    }
+  }
+}
+
+void ProjectWriter::WriteAssemblerFile(const Item& item) {
+  Element file(m_out, "CustomBuild", Attribute("Include", item.path));
+  for (const auto& config : m_project.configs) {
+    const bool isWin64 = config->platform == "Win64";
+    WriteConditional(
+        "Command", *config,
+        std::string(R"("$(VCInstallDir)bin)") +
+            (isWin64 ? R"(\x86_amd64\ml64" /c /Cx /D _M_X64)" : R"(\ml" /c /Cx /coff)") +
+            R"xml( /Fo "$(ProjectDir)$(PlatformName)\$(ConfigurationName)\$(ProjectName)\%(Filename).obj" "%(FullPath)")xml");
+    WriteConditional("Outputs", *config,
+                     R"($(ProjectDir)$(Platform)\$(Configuration)\$(ProjectName)\%(Filename).obj;%(Outputs))");
+  }
+}
+
+void ProjectWriter::WriteReference(const std::string& subproject) {
+  const Project* dependency = FindDependency(m_project, subproject);
+  if (!dependency || dependency->exported) return;
+  const std::string prefix(NamePrefix(IsTranslatedForm(*dependency, m_buildPrefix)));
+  Element reference(m_out, "ProjectReference", Attribute("Include", prefix + dependency->name + ".vcxproj"));
+  WriteValue("Project", GuidText(dependency->guid));
+  WriteValue("ReferenceOutputAssembly", "false");
+}
+
+// --- Pieces
+
+void ProjectWriter::WriteValue(std::string_view element, std::string_view value) {
+  m_out << "<" << element << ">" << value << "</" << element << ">\n";
+}
+
+void ProjectWriter::WriteConditional(std::string_view element, const ProjectConfig& config, std::string_view value) {
+  m_out << "<" << element << " " << Condition(config) << ">" << value << "</" << element << ">\n";
+}
+
+// A value ahead of what the property sheets give.
+void ProjectWriter::WriteInherited(std::string_view element, std::string_view value, std::string_view separator) {
+  m_out << "<" << element << ">" << value << separator << "%(" << element << ")</" << element << ">\n";
+}
+
+void ProjectWriter::WriteDirectory(const OptionMap& options, const std::string& property, std::string_view element) {
+  if (auto found = options.find(property); found != options.end()) WriteValue(element, found->second + "/");
+}
+
+// True when the map holds the option, also with an index that has no name.
+bool ProjectWriter::WriteEnumerated(const OptionMap& options, const EnumeratedOption& option) {
+  auto found = options.find(std::string(option.property));
+  if (found == options.end()) return false;
+  uint64_t index;
+  std::string error;
+  if (ParseNumber(found->second, index, error) && index < option.names.size()) {
+    WriteValue(option.element, option.names[index]);
+  } else {
+    TraceWriter() << option.property << " index = " << found->second << " out of range\n";
+  }
+  return true;
+}
+
+void ProjectWriter::WriteIncludes(const ProjectConfig& config, std::string_view value) {
+  WriteInherited("AdditionalIncludeDirectories", IncludeList(m_project, config, value, m_buildPrefix), ";");
+}
+
+}  // namespace
+
+void WriteVc10Project(TextWriter& out, Project& project, bool buildPrefix) {
+  ProjectWriter(out, project, buildPrefix).Write();
+}
+
+void WriteVc10Filters(TextWriter& out, Project& project, bool buildPrefix) {
+  const ItemList list = ItemsOf(project, buildPrefix);
+  out << kHead;
+  Element root(out, "Project", R"(ToolsVersion="4.0" )" + Attribute("xmlns", kNameSpace));
+  {
+    Element group(out, "ItemGroup");
+    for (const std::string& filter : list.filters) Element(out, "Filter", Attribute("Include", filter));
+  }
+  Element group(out, "ItemGroup");
+  for (const Item& item : list.items) {
+    Element element(out, item.file ? ItemName(*item.file) : "None", Attribute("Include", item.path));
+    if (!item.filter.empty()) out << "<Filter>" << item.filter << "</Filter>\n";
+  }
 }
 
 }  // namespace qrex

@@ -234,13 +234,6 @@ void WriteListSwitches(TextWriter& out, std::string_view name, const std::string
   for (const std::string& item : ListItems(list)) out << name << " \"" << item << "\" ";
 }
 
-const EnumeratedSwitch* FindEnumerated(std::string_view property, std::string_view valueText) {
-  for (const EnumeratedSwitch& row : kEnumerated) {
-    if (row.property == property && row.valueText == valueText) return &row;
-  }
-  return nullptr;
-}
-
 }  // namespace
 
 void WriteCompilerSwitches(TextWriter& out, const ProjectFile& file, const ProjectConfig& config) {
@@ -249,7 +242,7 @@ void WriteCompilerSwitches(TextWriter& out, const ProjectFile& file, const Proje
       out << row->name << (value == "true" ? " " : "- ");
     } else if (const auto* flag = FindProperty(kFlags, property)) {
       if (value == "true") out << flag->name << " ";
-    } else if (const auto* enumerated = FindEnumerated(property, value)) {
+    } else if (const auto* enumerated = FindValue(kEnumerated, property, value)) {
       out << enumerated->name << " ";
     } else if (property == kAdditionalOptions) {
       out << value << " ";

@@ -354,4 +354,12 @@ auto FindProperty(const Rows& rows, std::string_view property) {
   return static_cast<decltype(&rows[0])>(nullptr);
 }
 
+template <typename Rows>
+const EnumeratedSwitch* FindValue(const Rows& rows, std::string_view property, std::string_view valueText) {
+  for (const EnumeratedSwitch& row : rows) {
+    if (row.property == property && row.valueText == valueText) return &row;
+  }
+  return nullptr;
+}
+
 }  // namespace qrex

@@ -1,0 +1,20 @@
+// What the project formats of Visual Studio share.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "workspace/project_model.h"
+
+namespace qrex {
+
+inline std::string ConfigSpec(const ProjectConfig& config) { return config.name + "|" + config.platform; }
+
+// What stands in an include property whose option value is `value`: the project's own directories ahead of its items,
+// and for an item that begins with $(VIRTUAL_TREE) one entry for each root.
+std::string IncludeList(const Project& project, const ProjectConfig& config, std::string_view value, bool buildPrefix);
+
+// The properties of the librarian (for a static library) or of the linker.
+OptionMap LinkerOptions(const Project& project, const ProjectConfig& config);
+
+}  // namespace qrex
