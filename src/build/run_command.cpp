@@ -103,6 +103,8 @@ bool RunCommand(const std::string& command, int& returnCode, const CommandOption
     return false;
   }
   if (returnCode == kEndedBySignal + kInterrupt || returnCode == kEndedBySignal + kQuit) {
+    if (options.output) DeleteFile(kOutputFile);
+    if (options.errors) DeleteFile(kErrorFile);
     throw LexScannerException("Interrupted while running " + std::string(ToolOf(command)), nullptr);
   }
   if (IsAbnormalEnd(returnCode)) ReportAbnormalEnd(command, returnCode);

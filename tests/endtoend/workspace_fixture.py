@@ -1,0 +1,112 @@
+"""A workspace in a temporary folder, runs of the tool in it, and the closing line of an end-to-end test."""
+
+import os
+import shutil
+import stat
+import subprocess
+import sys
+import tempfile
+import traceback
+from pathlib import Path
+
+
+class Skipped(Exception):
+    """A test needs a tool that is not installed; the text names it."""
+
+
+class Workspace:
+    def __init__(self, binary, files):
+        self.binary = binary
+        self.folder = Path(tempfile.mkdtemp(prefix="qrex-"))
+        for name, text in files.items():
+            self.write(name, text)
+
+    def __enter__(self):
+        return self
+
+    def __exit__(self, *_):
+        shutil.rmtree(self.folder, ignore_errors=True)
+
+    def path(self, name):
+        return self.folder / name
+
+    def write(self, name, text):
+        path = self.path(name)
+        path.parent.mkdir(parents=True, exist_ok=True)
+        path.write_text(text)
+        if text.startswith("#!"):
+            path.chmod(path.stat().st_mode | stat.S_IXUSR)
+
+    def append(self, name, text):
+        with open(self.path(name), "a") as file:
+            file.write(text)
+
+    def replace(self, name, old, new):
+        text = self.path(name).read_text()
+        assert old in text, f"{old!r} does not stand in {name}"
+        self.path(name).write_text(text.replace(old, new))
+
+    def run(self, *arguments, status=0):
+        """Runs the tool; its standard output. Fails on another exit status."""
+        done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=300)
+        self.output = done.stdout
+        assert done.returncode == status, f"status {done.returncode}, not {status}:\n{done.stdout}{done.stderr}"
+        return done.stdout
+
+    def shell(self, command, status=0, **environment):
+        """Runs a shell command with the tool on PATH as `Qrex`; its output."""
+        path = f"{Path(self.binary).parent}:{os.environ['PATH']}"
+        done = subprocess.run(command, shell=True, cwd=self.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
+                              text=True, timeout=300, env={**os.environ, "PATH": path, **environment})
+        assert done.returncode == status, f"{command}: status {done.returncode}:\n{done.stdout}"
+        return done.stdout
+
+    def times(self, pattern):
+        """Name to modification time, of the files that the pattern matches."""
+        return {str(path.relative_to(self.folder)): path.stat().st_mtime_ns for path in self.folder.glob(pattern)}
+
+    def changed(self, before, pattern):
+        """The files of the pattern that are new or younger than in `before`."""
+        return sorted(name for name, time in self.times(pattern).items() if before.get(name) != time)
+
+
+def equal(got, expected):
+    assert got == expected, f"got\n{got}\nnot\n{expected}"
+
+
+def holds(text, *parts):
+    """The parts stand in the text, in this order."""
+    at = 0
+    for part in parts:
+        found = text.find(part, at)
+        assert found >= 0, f"{part!r} does not stand (in this order) in\n{text}"
+        at = found + len(part)
+
+
+def lacks(text, part):
+    assert part not in text, f"{part!r} stands in\n{text}"
+
+
+def need(*tools):
+    for tool in tools:
+        if not shutil.which(tool):
+            raise Skipped(tool)
+
+
+def run_tests(tests):
+    """Calls each test with the binary; prints failures, skips and the closing line; ends the process."""
+    binary = os.path.abspath(sys.argv[1])
+    passed = failed = skipped = 0
+    for test in tests:
+        try:
+            test(binary)
+            passed += 1
+        except Skipped as missing:
+            print(f"skipped: {test.__name__}: {missing} is not installed")
+            skipped += 1
+        except Exception:
+            print(f"FAILED: {test.__name__}")
+            traceback.print_exc(file=sys.stdout)
+            failed += 1
+    print(f"{passed} passed, {failed} failed" + (f", {skipped} skipped" if skipped else ""))
+    sys.exit(1 if failed else 0)
