@@ -59,7 +59,7 @@ const char* NameOf(Number number)
 $ROOT_TO_PROJDIR = "shape"
 @import "common.inc"
 subproj { "base" }
-+link { -L"out/lib/x64/Debug" }
++link { -shared -L"out/lib/x64/Debug" }
 qrex
 { "shape.h" "src" { "shape.cpp" "area.c" } }
 """,
