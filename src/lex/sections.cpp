@@ -4,8 +4,6 @@ namespace qrex {
 
 namespace {
 
-constexpr int kTabWidth = 4;
-
 std::string_view BracketText(int32_t open) {
   switch (open) {
     case kOpenParen:

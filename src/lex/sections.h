@@ -6,6 +6,8 @@
 
 namespace qrex {
 
+constexpr int kTabWidth = 4;  // the columns that a tab counts, everywhere
+
 TextRange ReadSection(LexScanner& scanner, bool openAlreadyRead, int32_t open, int32_t close);
 TextRange ReadParenSection(LexScanner& scanner, bool openAlreadyRead);
 TextRange ReadBracketSection(LexScanner& scanner, bool openAlreadyRead);

@@ -84,8 +84,31 @@ void ExpansionContext::Scope() {
   ExpandBlock(block, child, indent, CurrentColumn());
 }
 
+// Python minds indentation: that of the first statement goes from every line, wherever the braces stand.
+static void UnindentFirstLine(TextRange& block, int& indent) {
+  int columns = 0;
+  for (; !block.Empty() && std::string_view(" \t\n").find(*block.begin) != std::string_view::npos; ++block.begin) {
+    columns = *block.begin == '\n' ? 0 : columns + (*block.begin == '\t' ? kTabWidth : 1);
+    indent = columns;
+  }
+}
+
 void ExpansionContext::RunPython() {
-  throw LexScannerException("@runpython: Python initialisation error: no interpreter is built in", m_tokenText);
+  LexScanner scanner = m_scanner;
+  int indent;
+  TextRange block = ReadBraceBlock(scanner, indent);
+  UnindentFirstLine(block, indent);
+  if (!block.Empty()) {
+    const std::string code = ExpandPart(block, indent) + "\n";
+    try {
+      qrex::RunPython("", code, m_tokenText.begin);
+    } catch (LexScannerException& exception) {
+      exception.message += "\n    in @runpython()\n";
+      throw;
+    }
+  }
+  m_scanner = scanner;
+  DropToScanner();
 }
 
 // --- @for

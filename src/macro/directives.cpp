@@ -5,7 +5,6 @@
 #include "lex/literals.h"
 #include "lex/sections.h"
 #include "macro/directive_expression.h"
-#include "macro/python_bridge.h"
 #include "text/numbers.h"
 #include "text/paths.h"
 #include "text/trace.h"

@@ -1,6 +1,7 @@
 #include "macro/expand.h"
 
 #include "lex/literals.h"
+#include "lex/sections.h"
 #include "macro/directives.h"
 #include "macro/expansion_context.h"
 #include "text/numbers.h"
@@ -10,7 +11,6 @@ namespace qrex {
 namespace {
 
 constexpr int kMaxNesting = 1000;
-constexpr int kTabWidth = 4;
 int nesting = 0;
 
 }  // namespace

@@ -88,7 +88,7 @@ void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
     const std::string expression =
         ExpandAside(frame, macro.body, macro.stripIndent, macro.isTemporary ? AnchorForTemporary() : nullptr);
     try {
-      EmitGenerated(PythonEvaluate(m_frame, expression, m_tokenText.begin));
+      EmitGenerated(EvalPython(expression, m_tokenText.begin));
     } catch (LexScannerException& exception) {
       exception.message += "\n    invoking python macro " + macro.name.Text();
       throw;

@@ -4,13 +4,12 @@
 #include <cstring>
 
 #include "lex/scanner.h"
+#include "lex/sections.h"
 #include "macro/mpfw_parser.h"
 
 namespace qrex {
 
 namespace {
-
-constexpr int kTabWidth = 4;
 
 const char* MapInRun(const SourceMapRun& run, int64_t offsetInRun) {
   return run.generatedLength ? run.sourceBegin : run.sourceBegin + offsetInRun;
