@@ -8,6 +8,7 @@
 #include "translator/emit.h"
 #include "translator/interface_emission.h"
 #include "translator/records.h"
+#include "translator/type_expansion.h"
 
 namespace qrex {
 
@@ -34,11 +35,12 @@ std::vector<InterfaceDef::FlatBase> InterfaceDef::FlattenedBases() const {
 
 void InterfaceDef::AddFlattenedBases(std::vector<FlatBase>& flat, const std::string& path) const {
   for (const InterfaceDef* base : m_bases) {
-    const std::string basePath = path + "_" + base->name;
-    base->AddFlattenedBases(flat, basePath + ".");
     const bool isKnown =
         std::any_of(flat.begin(), flat.end(), [&](const FlatBase& known) { return known.base == base; });
-    if (!isKnown) flat.push_back({base, basePath});
+    if (isKnown) continue;  // and so are its own bases
+    const std::string basePath = path + "_" + base->name;
+    base->AddFlattenedBases(flat, basePath + ".");
+    flat.push_back({base, basePath});
   }
 }
 
@@ -64,14 +66,11 @@ class AttributeExpansion {
       : m_methods(interface.m_methods), m_root(*interface.owner.rootNameSpace) {}
 
   void Expand(const std::string& name, std::string_view type, size_t depth, bool readOnly) {
-    if (m_nesting > kMaxNesting) return;
-    ++m_nesting;
-    type = SkipMetadata(type);
-    while (static_cast<uint8_t>(type.front()) == kOpConst) {
+    std::string_view code = SkipToType(type, m_root);
+    for (; static_cast<uint8_t>(code.front()) == kOpConst; code = SkipToType(type, m_root)) {
       readOnly = true;
-      type = SkipMetadata(type.substr(1));
+      type = code.substr(1);
     }
-    const std::string_view code = SkipToType(type, m_root);
     switch (static_cast<uint8_t>(code.front())) {
       case kOpClass:
         ExpandClass(name, code, depth, readOnly);
@@ -84,12 +83,9 @@ class AttributeExpansion {
         if (!readOnly) AddSetter("Set" + name, depth).push_back(Argument(TypeCode(type), name));
         break;
     }
-    --m_nesting;
   }
 
  private:
-  static constexpr int kMaxNesting = 50;  // a model may hold a vector of itself
-
   static FunctionArg Argument(TypeCode type, std::string name) {
     FunctionArg argument;
     argument.type = std::move(type);
@@ -150,7 +146,6 @@ class AttributeExpansion {
 
   std::vector<FunctionSignature>& m_methods;
   NameSpace& m_root;
-  int m_nesting = 0;
 };
 
 // --- Reading
@@ -189,6 +184,7 @@ class InterfaceStatement {
   void ReadBases();
   void CheckBases();
   void ReadMembers();
+  void CheckAttribute(const std::string& name, const TypeCode& type);
   void WriteText();
   void AddDelegatorMixin();
   void RefuseNested(std::string_view modifier) {
@@ -256,6 +252,7 @@ void InterfaceStatement::ReadBases() {
     if (element.category != Category::Interface) {
       m_parser.Fail("Base interface name expected when read " + PrintedElement(element));
     }
+    if (&element == m_def) m_parser.Fail(PrintedElement(element) + " can't be its own base");
     m_def->m_bases.push_back(static_cast<InterfaceDef*>(&element));
   } while (m_parser.Accept(kComma));
   if (!m_parser.Is(kOpenBrace)) m_parser.FailExpected(", or {");
@@ -286,11 +283,19 @@ void InterfaceStatement::ReadMembers() {
     m_parser.ParseMethodOrAttribute(true, isAttribute, member, m_def->m_isIpc, m_def->m_reflected);
     if (isAttribute) {
       if (m_def->m_isIpc) m_parser.Fail("Attributes currently not supported on IPC interfaces");
+      CheckAttribute(member.name, member.returnType);
       m_def->m_attributes.push_back({member.name, member.returnType});
     } else {
       m_def->m_methods.push_back(std::move(member));
     }
     m_parser.Expect(kSemicolon, ";");
+  }
+}
+
+void InterfaceStatement::CheckAttribute(const std::string& name, const TypeCode& type) {
+  for (Follow follow : {Follow::Vectors, Follow::Elements}) {
+    const std::string fault = ExpansionFault(type, m_parser.Root(), follow, nullptr);
+    if (!fault.empty()) m_parser.Fail("Attribute " + name + " : " + fault);
   }
 }
 

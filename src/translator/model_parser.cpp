@@ -7,6 +7,7 @@
 #include "translator/class_parser.h"
 #include "translator/emit.h"
 #include "translator/model.h"
+#include "translator/type_expansion.h"
 
 namespace qrex {
 
@@ -112,6 +113,8 @@ void ModelBlock::CheckField(const ModelField& field) {
   context.serialisable = m_def.m_implementsIPersistable;
   std::string message;
   if (!CheckType(field.m_type, m_parser.Root(), context, message)) m_parser.Fail(message);
+  message = ExpansionFault(field.m_type, m_parser.Root(), Follow::Elements, &m_def);
+  if (!message.empty()) m_parser.Fail("Field " + field.m_name + " : " + message);
 }
 
 void ModelBlock::ParseConstructors() {
