@@ -168,6 +168,14 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     ASSERT_EQ(tail, generated.tail);
   }
 
+  // What stands behind the first `begin`, up to the first `end` behind it; all the rest when `end` is empty.
+  static std::string Section(const std::string& text, const std::string& begin, const std::string& end) {
+    const size_t found = text.find(begin);
+    if (found == std::string::npos) return "'" + begin + "' is not in:\n" + text;
+    const size_t start = found + begin.size();
+    return text.substr(start, end.empty() ? end.npos : text.find(end, start) - start);
+  }
+
   // The printed form of the error that the translation of `text` raises.
   std::string ErrorOf(const std::string& name, const std::string& text) {
     try {
