@@ -1,0 +1,436 @@
+#include "translate_fixture.h"
+
+namespace qrex {
+
+namespace {
+
+using InterfacesTest = TranslateTest;
+
+constexpr char kDiamond[] = R"($model Pos { bool y; };
+$interface+ A { void a(int32 i); };
+$interface+ K : A { int32 k() const; };
+$interface+ L : A { };
+$interface+ D : K, L
+{
+    void d(const string8& s, int32 n=3);
+    int32 v;
+    const xvector<int8> w;
+    Pos p;
+};
+)";
+
+TEST_F(InterfacesTest, DiamondWithAttributes) {
+  EXPECT_EQ(Section(Header(kDiamond), "struct D\n", ""), R"({
+    struct FnTable
+    {
+        K::FnTable _K;
+        L::FnTable _L;
+        void (__stdcall *d)(void* _self,vesk::string8 const& s,vesk::int32 n);
+        vesk::int32 (__stdcall *Getv)(void const* _self);
+        void (__stdcall *Setv)(void* _self,vesk::int32 v);
+        vesk::int32 (__stdcall *GetwSize)(void const* _self);
+        vesk::int8 (__stdcall *GetwElement)(void const* _self,vesk::int32 _k0);
+        bool (__stdcall *Getpy)(void const* _self);
+        void (__stdcall *Setpy)(void* _self,bool py);
+    };
+    D(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
+    
+    void AssignFrom(D& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
+    void AssignFrom(D const& _rhs) const { const_cast<D*>(this)->m_self = _rhs.m_self; const_cast<D*>(this)->m_table = _rhs.m_table; }
+    
+    template<typename T> struct Stubs
+    {
+        static void __stdcall d(void* _self,vesk::string8 const& s,vesk::int32 n) { ((T*)_self)->d(s,n); }
+        static vesk::int32 __stdcall Getv(void const* _self) { return ((const T*)_self)->Getv(); }
+        static void __stdcall Setv(void* _self,vesk::int32 v) { ((T*)_self)->Setv(v); }
+        static vesk::int32 __stdcall GetwSize(void const* _self) { return ((const T*)_self)->GetwSize(); }
+        static vesk::int8 __stdcall GetwElement(void const* _self,vesk::int32 _k0) { return ((const T*)_self)->GetwElement(_k0); }
+        static bool __stdcall Getpy(void const* _self) { return ((const T*)_self)->Getpy(); }
+        static void __stdcall Setpy(void* _self,bool py) { ((T*)_self)->Setpy(py); }
+        static const FnTable& GetTable()
+        {
+            static const FnTable t =
+            {
+                {
+                    {
+                        &A::Stubs<T>::a,
+                    },
+                    &K::Stubs<T>::k,
+                },
+                {
+                    {
+                        &A::Stubs<T>::a,
+                    },
+                },
+                &d,
+                &Getv,
+                &Setv,
+                &GetwSize,
+                &GetwElement,
+                &Getpy,
+                &Setpy
+            };
+            return t;
+        }
+    };
+    
+    template<typename T> void CoerceFrom(T* _rhs) { m_self = _rhs; m_table = &Stubs<T>::GetTable(); }
+    template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<D*>(this)->m_self = const_cast<T*>(_rhs); const_cast<D*>(this)->m_table = &Stubs<T>::GetTable(); }
+    
+    void a(vesk::int32 i) { m_table->_K._A.a(m_self,i); }
+    vesk::int32 k() const { return m_table->_K.k(m_self); }
+    void d(vesk::string8 const& s,vesk::int32 n=3) { m_table->d(m_self,s,n); }
+    vesk::int32 Getv() const { return m_table->Getv(m_self); }
+    void Setv(vesk::int32 v) { m_table->Setv(m_self,v); }
+    vesk::int32 GetwSize() const { return m_table->GetwSize(m_self); }
+    vesk::int8 GetwElement(vesk::int32 _k0) const { return m_table->GetwElement(m_self,_k0); }
+    bool Getpy() const { return m_table->Getpy(m_self); }
+    void Setpy(bool py) { m_table->Setpy(m_self,py); }
+    
+    operator A() const { return A(m_self, &m_table->_K._A); }
+    operator K() const { return K(m_self, &m_table->_K); }
+    operator L() const { return L(m_self, &m_table->_L); }
+    
+    union
+    {
+        struct
+        {
+            operator vesk::int32() const { return CONST_ATTRIB_CAST(D,v)->Getv(); }
+            void operator=(vesk::int32 const& _v) { ATTRIB_CAST(D,v)->Setv(_v); }
+        } v;
+        struct
+        {
+            operator vesk::xvector<vesk::int8> const() const { return CONST_ATTRIB_CAST(D,w)->Getw(); }
+        } w;
+        struct
+        {
+            operator Pos() const { return CONST_ATTRIB_CAST(D,p)->Getp(); }
+            union
+            {
+                struct
+                {
+                    operator bool() const { return CONST_ATTRIB_CAST(D,p.y)->Getpy(); }
+                    void operator=(bool const& _v) { ATTRIB_CAST(D,p.y)->Setpy(_v); }
+                } y;
+            };
+        } p;
+        void* m_self;
+    };
+    FnTable const* m_table;
+};
+template <typename BC>
+struct DDelegatorMixin : public BC
+{
+    void d(vesk::string8 const& s,vesk::int32 n=3) { BC::GetD().d(s,n); }
+    vesk::int32 Getv() const { return BC::GetD().Getv(); }
+    void Setv(vesk::int32 v) { BC::GetD().Setv(v); }
+    vesk::int32 GetwSize() const { return BC::GetD().GetwSize(); }
+    vesk::int8 GetwElement(vesk::int32 _k0) const { return BC::GetD().GetwElement(_k0); }
+    bool Getpy() const { return BC::GetD().Getpy(); }
+    void Setpy(bool py) { BC::GetD().Setpy(py); }
+};
+
+vesk::ReflectedInterface const& _GetReflected(D const*);
+
+namespace vesk
+{
+template<> struct TypeTraits<D>
+{
+    static const bool is_exported = 1;
+    static const bool is_reflected = 1;
+    static const bool is_registered = 1;
+    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
+    static const bool has_metadata = 0;
+};
+template<> struct InterfaceTypeTraits<D>
+{
+    static const bool is_ipc = false;
+    static const bool is_rmi = false;
+};
+template<> struct _is_direct_superinterface_of<K,D> { static const bool value = true; };
+template<> struct _is_direct_superinterface_of<L,D> { static const bool value = true; };
+template<> struct _is_indirect_superinterface_of<A,D> { static const bool value = true; };
+} // namespace vesk
+
+)");
+  EXPECT_EQ(Section(Tail(kDiamond), "_GetReflected(D const*)\n", "    \n    // Registration"), R"(    {
+        static vesk::ConstStringZ D_bases[] =
+        {
+            "K",
+            "L",
+        };
+        static const vesk::octet_t D_d_s[] =
+        {
+            0x36,0x31,0x10
+        };
+        static const vesk::octet_t D_d_n[] =
+        {
+            0x04
+        };
+        static const vesk::ReflectedArg D_d_args[] =
+        {
+            { "s", D_d_s },
+            { "n", D_d_n },
+        };
+        static const vesk::octet_t D_Getv_return[] =
+        {
+            0x04
+        };
+        static const vesk::octet_t D_Setv_v[] =
+        {
+            0x04
+        };
+        static const vesk::ReflectedArg D_Setv_args[] =
+        {
+            { "v", D_Setv_v },
+        };
+        static const vesk::octet_t D_GetwSize_return[] =
+        {
+            0x04
+        };
+        static const vesk::octet_t D_GetwElement_return[] =
+        {
+            0x02
+        };
+        static const vesk::octet_t D_GetwElement__k0[] =
+        {
+            0x04
+        };
+        static const vesk::ReflectedArg D_GetwElement_args[] =
+        {
+            { "_k0", D_GetwElement__k0 },
+        };
+        static const vesk::octet_t D_Getpy_return[] =
+        {
+            0x01
+        };
+        static const vesk::octet_t D_Setpy_py[] =
+        {
+            0x01
+        };
+        static const vesk::ReflectedArg D_Setpy_args[] =
+        {
+            { "py", D_Setpy_py },
+        };
+        static const vesk::octet_t D_v[] =
+        {
+            0x04
+        };
+        static const vesk::octet_t D_w[] =
+        {
+            0x31,0x44,0x02
+        };
+        static const vesk::octet_t D_p[] =
+        {
+            0x20,0x00,0x00
+        };
+        static const vesk::ReflectedAttribute D_attributes[] =
+        {
+            { "v",D_v },
+            { "w",D_w },
+            { "p",D_p },
+        };
+        static vesk::ConstStringZ D_stringTable[] =
+        {
+            "Pos",
+        };
+        static const vesk::ReflectedInterfaceMethod D_methods[] =
+        {
+            {"d",{0},D_d_args,2,0},
+            {"Getv",{D_Getv_return},0,0,0},
+            {"Setv",{0},D_Setv_args,1,0},
+            {"GetwSize",{D_GetwSize_return},0,0,0},
+            {"GetwElement",{D_GetwElement_return},D_GetwElement_args,1,0},
+            {"Getpy",{D_Getpy_return},0,0,0},
+            {"Setpy",{0},D_Setpy_args,1,0},
+        };
+        static const vesk::ReflectedInterface D_interface =
+        {
+            "D",
+            0,
+            D_bases,2,
+            3,
+            D_methods,7,
+            D_attributes,3,
+            D_stringTable
+        };
+        return D_interface;
+    }
+)");
+}
+
+TEST_F(InterfacesTest, AttributesBecomeMethods) {
+  const struct {
+    const char *attribute, *slots;
+  } kAttributes[] = {
+      {"const int32 x", "vesk::int32 (__stdcall *Getx)(void const* _self);\n"},
+      {"ConstNumber x", "vesk::int32 (__stdcall *Getx)(void const* _self);\n"},
+      {"Number x", "Number (__stdcall *Getx)(void const* _self);\nvoid (__stdcall *Setx)(void* _self,Number x);\n"},
+      {"Plain x", ""},
+      {"xmap<int32,bool> x",
+       "vesk::xmap<vesk::int32,bool > (__stdcall *Getx)(void const* _self);\n"
+       "void (__stdcall *Setx)(void* _self,vesk::xmap<vesk::int32,bool > x);\n"},
+      {"const xvector<xvector<Number> > x",
+       "vesk::int32 (__stdcall *GetxSize)(void const* _self);\n"
+       "vesk::int32 (__stdcall *GetxElementSize)(void const* _self,vesk::int32 _k0);\n"
+       "Number (__stdcall *GetxElementElement)(void const* _self,vesk::int32 _k0,vesk::int32 _k1);\n"},
+      {"xvector<Pos> x",
+       "vesk::int32 (__stdcall *GetxSize)(void const* _self);\n"
+       "void (__stdcall *DeleteFromx)(void* _self,vesk::int32 i1,vesk::int32 i2);\n"
+       "void (__stdcall *RecordExtractFromx)(void* _self,vesk::int32 si1,vesk::int32 si2,vesk::xvector<Pos>& dst,"
+       "vesk::int32 di);\n"
+       "void (__stdcall *InsertIntox)(void* _self,vesk::int32 di,vesk::xvector<Pos>& src,vesk::int32 si1,"
+       "vesk::int32 si2);\n"
+       "bool (__stdcall *GetxElementy)(void const* _self,vesk::int32 _k0);\n"
+       "void (__stdcall *SetxElementy)(void* _self,vesk::int32 _k0,bool xElementy);\n"},
+  };
+  const std::string declared =
+      "$typedef int32 Number;\n$typedef const int32 ConstNumber;\n$struct Plain { };\n$model Pos { bool y; };\n";
+  for (const auto& [attribute, slots] : kAttributes) {
+    std::string text = Section(Header(declared + "$interface I { " + attribute + "; };\n"),
+                               "struct I\n{\n    struct FnTable\n    {\n", "    };\n");
+    for (size_t indent; (indent = text.find("        ")) != text.npos;) text.erase(indent, 8);
+    EXPECT_EQ(text, slots) << attribute;
+  }
+  // What is noted of the attribute is noted of what its method answers.
+  EXPECT_EQ(Section(Tail("$interface+ I { const int32 : [ 7 ] x; };\n"), "I_Getx_return[] =\n", ";"),
+            "        {\n            0x04\n        }");
+  EXPECT_EQ(Section(Tail("$interface+ I { int32 : [ 7 ] x; };\n"), "I_Setx_x[] =\n", ";"),
+            "        {\n            0xe1,0xa2,0x07,0x00,0x00,0x00,0x04\n        }");
+}
+
+// In a handle the key proxies answer by value; a constant attribute keeps the const operator[] alone.
+TEST_F(InterfacesTest, ProxiesOfAttributes) {
+  EXPECT_EQ(
+      Section(Header("$interface I { const xmap<string8,string8> m; };\n"), "    union\n    {\n", "        void*"),
+      R"(        struct
+        {
+            operator vesk::xmap<vesk::string8,vesk::string8 > const() const { return CONST_ATTRIB_CAST(I,m)->Getm(); }
+            struct mElement
+            {
+                mElement(I* _self, vesk::string8 _k) : _self(_self),_k0(_k) {}
+                vesk::Path GetmElementPath() const { return _self->GetmElementPath(_k0); }
+                vesk::string8 const& _model__mElement() const { return _self->_model__mElement(_k0); }
+                vesk::string8& _model__mElement() { return _self->_model__mElement(_k0); }
+                vesk::string8 const& GetmElement() const { return _self->GetmElement(_k0); }
+                operator vesk::string8() const { return _self->GetmElement(_k0); }
+                I* _self;
+                vesk::string8 _k0;
+            };
+            mElement const operator[](vesk::string8 _k0) const
+            {
+                return mElement(const_cast<I*>(CONST_ATTRIB_CAST(I,m)),_k0);
+            }
+        } m;
+)");
+}
+
+TEST_F(InterfacesTest, Empty) {
+  EXPECT_EQ(Section(Header("$interface I { };\n"), "        static const FnTable& GetTable()\n", "    };\n    \n"),
+            "        {\n            static const FnTable t = {};\n            return t;\n        }\n");
+}
+
+TEST_F(InterfacesTest, Nested) {
+  const std::string header = Header("$class C\n{\n    $interface I { void f(); };\n    int x;\n};\n");
+  EXPECT_EQ(Section(header, "class C\n{\n", "        void (__stdcall"), "    struct I\n{\n    struct FnTable\n    {\n");
+  EXPECT_EQ(Section(header, "{ BC::GetI().f(); }\n", "\npublic"), "};\n\n    int x;\n");
+  EXPECT_EQ(header.find("TypeTraits<I>"), header.npos);
+}
+
+TEST_F(InterfacesTest, ClassThatImplementsADerivedInterface) {
+  const std::string declarations =
+      "$interface+ A : vesk::IObject { };\n$interface+ B : A { };\n$interface U { };\n$class+ K isa U, B { };\n";
+  const std::string header = Header(declarations);
+  EXPECT_EQ(trace,
+            "app/src/t0.h(5) : warning W1003 : isa on $interface U doesn't inherit from IObject\n"
+            "app/src/t0.h(4) : see declaration of $interface U\n"
+            "app/src/t0.h(5) : warning W1013 : isa on $interface U not reflected\n"
+            "app/src/t0.h(4) : see declaration of $interface U\n");
+  EXPECT_EQ(Section(header, "using_model_base_class = 0;\n};\n", "} // namespace vesk"),
+            R"(template<> struct directly_implements_interface<K,U> { static const bool value = true; };
+template<> struct directly_implements_interface<K,B> { static const bool value = true; };
+template<> struct indirectly_implements_interface<K,vesk::IObject> { static const bool value = true; };
+template<> struct indirectly_implements_interface<K,A> { static const bool value = true; };
+)");
+  const std::string tail = Tail(declarations);
+  EXPECT_EQ(Section(tail, "//### $class+ K\nnamespace vesk { XTarget* app_GetXTarget(); }\n", "            1,\n"),
+            R"(    vesk::ptr<vesk::IObject> __stdcall K::sfnCreateInstance()
+    {
+        return static_cast<vesk::ptr<B> >(new K());
+    }
+    vesk::ReflectedClass const& _GetReflected(K const*)
+    {
+        static vesk::ConstStringZ K_interfaces[] =
+        {
+            "vesk::IObject",
+            "A",
+            "U",
+            "B",
+        };
+        static const vesk::ReflectedClass K_class =
+        {
+)");
+  EXPECT_EQ(Section(tail, "            K_interfaces,", "            {\n"),
+            "2,2,\n            &vesk::IObject::Stubs<K>::GetTable(),\n            &K::sfnCreateInstance,\n");
+  EXPECT_EQ(Section(tail, "m_ops;\n    }\n", "    \n    // Registration"), R"(    
+    vesk::AnyInterface K::QueryInterface(const vesk::ReflectedInterface& _ri)
+    {
+        if (&_ri == &vesk::GetReflectedInterface<vesk::IObject >()) { vesk::ptr<vesk::IObject> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
+        if (&_ri == &vesk::GetReflectedInterface<A >()) { vesk::ptr<A> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
+        if (&_ri == &vesk::GetReflectedInterface<B >()) { vesk::ptr<B> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
+        return vesk::AnyInterface();
+    }
+    vesk::ReflectedClass const* K::GetReflectedClass() const
+    {
+        return &_GetReflected( (K*) 0);
+    }
+)");
+  EXPECT_EQ(Section(Header("$class P isa vesk::IPersistable { };\n"), "namespace vesk\nclass P : public ", "\n"),
+            "vesk::PersistableMixin<vesk::IObjectBaseMixin<P,vesk::EmptyBase>>");
+}
+
+TEST_F(InterfacesTest, Warnings) {
+  Header(R"($interface U { };
+$interface+ A : vesk::IObject { };
+$interface B << -register >> : U { };
+$interface+ C : U, A { };
+$interface D : A { };
+)");
+  EXPECT_EQ(trace,
+            "app/src/t0.h(4) : warning W1004 : $interface B is not reflected and has redundant << >> directives\n"
+            "app/src/t0.h(5) : warning W1006 : Inconsistent subtyping of IObject in base interfaces\n"
+            "    $interface U doesn't subtype IObject\n"
+            "    $interface+ A subtypes IObject\n"
+            "app/src/t0.h(2) : see declaration of $interface U\n"
+            "app/src/t0.h(3) : see declaration of $interface+ A\n"
+            "app/src/t0.h(5) : warning W1002 : Reflected $interface+ C references non-registered $interface U\n"
+            "app/src/t0.h(2) : see declaration of $interface U\n"
+            "app/src/t0.h(6) : warning W1007 : $interface D subtypes IObject but isn't reflected\n");
+}
+
+TEST_F(InterfacesTest, Faults) {
+  const struct {
+    const char *declarations, *fault;
+  } kFaults[] = {
+      {"$interface+ + I { };", "1: '+' modifier repeated"},
+      {"$class C {\n$interface+ I { }; };", "2: '+' modifier not permitted on nested interface"},
+      {"$class C {\n$interface ipc I { }; };", "2: 'ipc' modifier not permitted on nested interface"},
+      {"$class C {\n$interface rmi I { }; };", "2: 'rmi' modifier not permitted on nested interface"},
+      {"$struct I { };\n$interface I { };", "2: $interface I conflicts with previous declaration of $struct I"},
+      {"$interface I { };\n$interface I { };", "2: Repeated definition of $interface I"},
+      {"$interface I << abstract >> { };", "1: Unrecognised qualifier << abstract >> on $interface I"},
+      {"$interface I : { };", "1: Expected identifier after : when read {"},
+      {"$struct S { };\n$interface I : S { };", "2: Base interface name expected when read $struct S"},
+      {"$interface J { };\n$interface I : J J { };", "2: Expected , or { after J when read J"},
+      {"$interface I : I { };", "1: $interface I can't be its own base"},
+      {"$interface I [ ] { };", "1: Expected { after I when read ["},
+      {"$interface I {\nvoid f() }; ", "2: Expected ; after ) when read }"},
+      {"$interface I {\nvoid f(); }\nint", "3: ; expected after definition of $interface I when read int"},
+      {"$model M { xvector<M> m; };\n$interface I { M a; };", "2: Attribute a : $model M contains itself"},
+  };
+  for (const auto& [declarations, fault] : kFaults) EXPECT_EQ(FaultOf(declarations), fault) << declarations;
+}
+
+}  // namespace
+
+}  // namespace qrex

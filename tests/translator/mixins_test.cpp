@@ -1,0 +1,295 @@
+#include "translate_fixture.h"
+
+namespace qrex {
+
+namespace {
+
+using MixinsTest = TranslateTest;
+
+constexpr char kTypeOps[] = "            {\n                sizeof";  // the last piece of a class record begins so
+
+constexpr char kListOfEverySort[] = R"($mixin M << reflect >>
+{
+    $int32 a;
+};
+$model Pos { bool y; };
+namespace n { $mixin T { }; }
+$class+ K : mixin
+[
+    M
+    { $bool b; int plain; }
+    Pos
+    ? other::U <int, 3>
+    n::T<char>
+    model { int8 z; }
+]
+{
+};
+)";
+
+TEST_F(MixinsTest, NamedMixin) {
+  EXPECT_EQ(Section(Header(kListOfEverySort), "template <typename BC>\nstruct M : public BC\n", "struct Pos\n"), R"({
+    typedef BC BaseClass;
+
+    vesk::int32 a;
+
+public:
+    vesk::int32 Geta() const { return a; }
+    void Seta(vesk::int32 _v) { a = _v; }
+    
+};
+
+template <typename BC> vesk::TypeOps const& _GetTypeOps(M const*)
+{
+    return vesk::GetReflectedClass<M>().m_ops;
+}
+
+)");
+}
+
+TEST_F(MixinsTest, ListOfEverySortOfEntry) {
+  const std::string header = Header(kListOfEverySort);
+  EXPECT_EQ(Section(header, "struct K_Mixin_0 : public BC\n", "    bool operator<"), R"({
+    typedef BC BaseClass;
+    using typename BC::FinalClass;
+ bool b; int plain; 
+
+};
+
+struct K_Mixin_1_model
+{
+    
+    K_Mixin_1_model() : z(0) {}
+    explicit K_Mixin_1_model(vesk::int8 const& z_) : z(z_) {}
+    void Serialise(vesk::Archive&) const;
+    void Deserialise(vesk::InputArchive&);
+    void EvictDgsNodes() const {vesk::DataSourceEvict(&z);}
+    void VisitObjects(vesk::IObjectVisitor& _v) const {}
+    void VisitPrefs(vesk::IPrefVisitor& _v) const {}
+)");
+  EXPECT_EQ(Section(header, "struct K_Mixin_1_model_mixin : public BC\n", "    bool operator<"),
+            "{\n    using typename BC::FinalClass;\n    \n");
+  const std::string base =
+      "K_Mixin_1_model_mixin<n::T<other::U <Pos_model_mixin<K_Mixin_0<M<vesk::BaseMixin<K,vesk::EmptyBase> > > >"
+      ",int, 3 >,char > >";
+  EXPECT_EQ(Section(header, "} // namespace vesk\nclass K", ""), " : public " + base + R"(
+{
+public:
+    typedef )" + base + R"( BaseClass;
+
+
+public:
+    vesk::int32 Geta() const { return a; }
+    void Seta(vesk::int32 _v) { a = _v; }
+    bool Getb() const { return b; }
+    void Setb(bool _v) { b = _v; }
+    
+    friend vesk::ReflectedClass const& _GetReflected(K const*);
+};
+
+vesk::ReflectedClass const& _GetReflected(K const*);
+vesk::TypeOps const& _GetTypeOps(K const*);
+
+)");
+}
+
+// What a mixin reflects stands in the record of the class; the model of an entry is reached through its _model_.
+TEST_F(MixinsTest, RecordOfAClassWithMixins) {
+  const std::string tail = Tail(kListOfEverySort);
+  EXPECT_EQ(Section(tail, "vesk::ReflectedClass const& _GetReflected(K const*)\n", kTypeOps),
+            R"(    {
+        static const vesk::octet_t K_a[] =
+        {
+            0x04
+        };
+        static const vesk::ReflectedField K_fields[] =
+        {
+            { "a", offsetof(K,a), K_a },
+        };
+        static const vesk::octet_t K_y[] =
+        {
+            0x01
+        };
+        static const vesk::octet_t K_z[] =
+        {
+            0x02
+        };
+        static const vesk::ReflectedModelField K_modelFields[] =
+        {
+            { "y", offsetof(K,_model_.y), K_y, 0, -1 },
+            { "z", offsetof(K,_model_.z), K_z, 0, -1 },
+        };
+        static const vesk::ReflectedClass K_class =
+        {
+            1,
+            "K",
+            sizeof(K),
+            0,
+            K_fields,1,
+            K_modelFields,2,
+            0,0,
+            0,0,
+            0,
+            0,0,0,
+            0,
+            0,
+)");
+}
+
+TEST_F(MixinsTest, BasesAroundAList) {
+  EXPECT_EQ(Section(Header("$struct K : public B, C mixin [ ] D, E : [ 7 ] { };\n"), "struct K__BASE", "\n{"),
+            " : public B, C {};\nstruct K;\n\nnamespace vesk");
+  EXPECT_EQ(Section(Header("$mixin M : B mixin [ ? X ] { };\n"), "template <typename BC>\n", "\npublic"),
+            "struct M__BASE : BC,B {};\ntemplate <typename BC>\nstruct M : public X <M__BASE<BC> >\n\n{\n"
+            "    typedef X <M__BASE<BC> > BaseClass;\n ");
+}
+
+TEST_F(MixinsTest, AdtAndItsImplementation) {
+  const std::string adt = R"($adt+ A : [ 7 ]
+{
+    int32 get(int32 i) const;
+    void set(const string8& s);
+};
+)";
+  EXPECT_EQ(Section(Header(adt), "", "template<> struct ClassTypeTraits"), R"(struct A;
+vesk::ReflectedClass const& _GetReflected(A const*);
+vesk::TypeOps const& _GetTypeOps(A const*);
+
+vesk::int32 __stdcall get(A const* _self,vesk::int32 i);
+
+void __stdcall set(A* _self,vesk::string8 const& s);
+
+namespace vesk
+{
+template<> struct TypeTraits<A>
+{
+    static const bool is_exported = 1;
+    static const bool is_reflected = 1;
+    static const bool is_registered = 1;
+    static const vesk::ETypeTraitKind kind = vesk::TTK_adt;
+    static const bool has_metadata = 1;
+};
+)");
+  AddFile("a.h", kImport + adt);
+  EXPECT_EQ(Section(Translate("a.cpp", R"(@import "a.h"
+$adt+ implement A
+{
+    int n;
+    int get(int i) const { return n + i; }
+    $implementing adt A { set };
+};
+int behind;
+)"),
+                    "#include \"a.h\"\n", kTypeOps),
+            R"(struct A
+{
+    int n;
+    int get(int i) const { return n + i; }
+    void set(vesk::string8 const& s);
+
+
+public:
+    
+    friend vesk::ReflectedClass const& _GetReflected(A const*);
+};
+
+inline vesk::int32 __stdcall get(A const* _self,vesk::int32 i) { return _self->get(i); }
+inline void __stdcall set(A* _self,vesk::string8 const& s) { _self->set(s); }
+int behind;
+
+//### $adt+ A
+namespace vesk { XTarget* app_GetXTarget(); }
+    vesk::ReflectedClass const& _GetReflected(A const*)
+    {
+        static const vesk::octet_t A_get_return[] =
+        {
+            0x04
+        };
+        static const vesk::octet_t A_get_i[] =
+        {
+            0x04
+        };
+        static const vesk::ReflectedArg A_get_args[] =
+        {
+            { "i", A_get_i },
+        };
+        static const vesk::octet_t A_set_s[] =
+        {
+            0x36,0x31,0x10
+        };
+        static const vesk::ReflectedArg A_set_args[] =
+        {
+            { "s", A_set_s },
+        };
+        static const vesk::ReflectedClassMethod A_methods[] =
+        {
+            {"get",{A_get_return},A_get_args,1,0,true,(vesk::FunctionPointer)(vesk::int32 (__stdcall *)(A const* _self,vesk::int32 i))&::get},
+            {"set",{0},A_set_args,1,0,false,(vesk::FunctionPointer)(void (__stdcall *)(A* _self,vesk::string8 const& s))&::set},
+        };
+        static const vesk::ReflectedClass A_class =
+        {
+            16,
+            "A",
+            sizeof(A),
+            0,
+            0,0,
+            0,0,
+            0,0,
+            A_methods,2,
+            0,
+            0,0,0,
+            0,
+            0,
+)");
+}
+
+TEST_F(MixinsTest, Implementing) {
+  const std::string declared =
+      "$interface+ I : vesk::IObject { int32 f(int32 a=1) const; void g(); };\n$adt A { void h(string8 s); };\n";
+  EXPECT_EQ(
+      Section(Header(declared + "$class K isa I { $implementing I { g f }, adt A; };\n"), " BaseClass;\n", "\npublic"),
+      " void g();\nvesk::int32 f(vesk::int32 a=1) const;\nvoid h(vesk::string8 s);\n ");
+  EXPECT_EQ(trace, "");
+  EXPECT_EQ(Section(Header(declared + "$class K { $implementing I; };\n"), "class K\n{", "\npublic"),
+            " vesk::int32 f(vesk::int32 a=1) const;\nvoid g();\n ");
+  EXPECT_EQ(trace,
+            "app/src/t1.h(4) : warning W1014 : $class K implementing $interface+ I without associated 'isa'\n"
+            "app/src/t1.h(2) : see declaration of $interface+ I\n");
+}
+
+TEST_F(MixinsTest, Faults) {
+  const struct {
+    const char *declarations, *fault;
+  } kFaults[] = {
+      {"$class C { };\n$class K : mixin [ C ] { };", "2: $class C is not a $mixin or $model"},
+      {"$interface I { };\n$class K : mixin [\nI\n] { };", "3: $interface I is not a $class or $struct"},
+      {"$class K : mixin [ X ] { };", "1: Unrecognised identifier : X"},
+      {"$mixin M { };\n$class K : mixin [ M, M ] { };", "2: Expected identifier after M when read ,"},
+      {"$class K : mixin [ ? 5 ] { };", "1: Expected mixin name when read 5"},
+      {"$class K : mixin [ ? a::\n5 ] { };", "2: Expected identifier after a:: when read 5"},
+      {"$class K : mixin [\nmodel\n+ ] { };", "2: Expected { after 'model' when read +"},
+      {"$class K : mixin [ ?\nM<int", "2: Met EOS before read matching angled bracket"},
+      {"$class K : mixin { };", "1: Expected [ after mixin when read {"},
+      {"$class K mixin [ ] { };", "1: Expected : after K when read mixin"},
+      {"$adt A {\nint32 f();", "2: Met EOS before read matching brace"},
+      {"$adt A : { };", "1: Expected [ after : when read {"},
+      {"$adt A { int32 f(); }\nint", "2: ; expected after definition of $adt A when read int"},
+      {"$adt A { };\n$adt A { };", "2: Repeated definition of $adt A"},
+      {"$adt implement A { };", "1: Can't implement undefined $adt A"},
+      {"$adt A;\n$adt implement A { };", "2: Can't implement undefined $adt A"},
+      {"$adt A { };\n$adt implement A { };\n$adt implement A { };", "3: Repeated implementation of $adt A"},
+      {"$adt A { };\n$adt implement A;", "2: Forward declaration of $adt A incompatible with 'implements'"},
+      {"$class implement A { };", "1: 'implement' modifier only permitted on $adt"},
+      {"$class K { $implementing K; };", "1: $interface identifier expected when read $class K"},
+      {"$interface I { };\n$class K { $implementing\nadt I; };", "3: $adt identifier expected when read $interface I"},
+      {"$interface I { };\n$class K { $implementing I -f; };", "2: - not supported"},
+      {"$interface I { void f(); };\n$class K { $implementing I { f\ng }; };", "3: $interface I has no method named g"},
+      {"$interface I { };\n$class K { $implementing I { 5 }; };", "2: Expected identifier after { when read 5"},
+      {"$interface I { };\n$class K { $implementing I { } x", "2: Expected , or ; after } when read x"},
+  };
+  for (const auto& [declarations, fault] : kFaults) EXPECT_EQ(FaultOf(declarations), fault) << declarations;
+}
+
+}  // namespace
+
+}  // namespace qrex

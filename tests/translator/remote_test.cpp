@@ -1,0 +1,218 @@
+#include "translate_fixture.h"
+
+namespace qrex {
+
+namespace {
+
+class RemoteTest : public TranslateTest {
+ protected:
+  // An interface with a method of no parameters, one with all directions, one that only answers.
+  std::string Declared(const std::string& kind) {
+    return "$model Pos { bool y; };\nnamespace n\n{\n$interface+ " + kind + R"( J
+{
+    void none() const;
+    void all([in] int32 a, [in] const string8& b, [out] string8& c, [inout] xvector<int8>& d, [copy] Pos* e);
+    void back([out] int8& r);
+};
+}
+)";
+  }
+};
+
+TEST_F(RemoteTest, IpcIsAStubAndAScion) {
+  EXPECT_EQ(Section(Tail(Declared("ipc")), "} // n\n", "\n//### $model Pos"), R"(
+//### Registration of stub/scion of $interface+ n::J
+namespace n
+{
+struct StubJ : vesk::Stub
+{
+    StubJ() : Stub(vesk::ptr<J>(this),3) {}
+    void none() const
+    {
+        StubBegin(0,NULL);
+        StubEnd();
+    }
+    static void Result_all(vesk::Archive& _ar, void** _p)
+    {
+        _ar >> *(vesk::string8*) *_p++;
+        _ar >> *(vesk::xvector<vesk::int8>*) *_p++;
+    }
+    void all(vesk::int32 a,vesk::string8 const& b,vesk::string8& c,vesk::xvector<vesk::int8>& d,Pos* e)
+    {
+        vesk::QueuedResponse<2>* qr__ = new vesk::QueuedResponse<2>;
+        qr__->m_fn = &Result_all;
+        qr__->m_outparams[0] = &c;
+        qr__->m_outparams[1] = &d;
+        StubBegin(1,qr__) << a << b << d << *e;
+        StubEnd();
+    }
+    static void Result_back(vesk::Archive& _ar, void** _p)
+    {
+        _ar >> *(vesk::int8*) *_p++;
+    }
+    void back(vesk::int8& r)
+    {
+        vesk::QueuedResponse<1>* qr__ = new vesk::QueuedResponse<1>;
+        qr__->m_fn = &Result_back;
+        qr__->m_outparams[0] = &r;
+        StubBegin(2,qr__);
+        StubEnd();
+    }
+};
+struct StubJFactory : public vesk::IStubFactory
+{
+    StubJFactory()
+    {
+        vesk::RegisterStub(vesk::GetIpcInterfaceName<J>(),this);
+    }
+    ~StubJFactory()
+    {
+        vesk::UnregisterStub(vesk::GetIpcInterfaceName<J>());
+    }
+    virtual vesk::Stub* CreateStub()
+    {
+        return new StubJ;
+    }
+};
+void _Register_StubJ()
+{
+    static StubJFactory s;
+}
+struct ScionJ : vesk::Scion
+{
+    ScionJ() : vesk::Scion(GetScionThunkFnTable(),3) {}
+    J& Invoke()
+    {
+        return reinterpret_cast<J&>(m_delegate);
+    }
+    void Thunk0()
+    {
+        Pop();
+        Invoke()->none();
+    }
+    void Thunk1()
+    {
+        vesk::int32 a;
+        vesk::string8 b;
+        vesk::string8 c;
+        vesk::xvector<vesk::int8> d;
+        std::auto_ptr<Pos> e(new Pos);
+        auto _ar = Pop(); _ar >> a >> b >> d >> *e;
+        Invoke()->all(a,b,c,d,e.release());
+        Push() << c << d;
+    }
+    void Thunk2()
+    {
+        vesk::int8 r;
+        auto _ar = Pop(); _ar;
+        Invoke()->back(r);
+        Push() << r;
+    }
+    static void sThunk0(void* _self) { ((ScionJ*)_self)->Thunk0(); }
+    static void sThunk1(void* _self) { ((ScionJ*)_self)->Thunk1(); }
+    static void sThunk2(void* _self) { ((ScionJ*)_self)->Thunk2(); }
+    static const vesk::ScionThunkFn* GetScionThunkFnTable()
+    {
+        static const vesk::ScionThunkFn t[] =
+        {
+            &sThunk0,
+            &sThunk1,
+            &sThunk2,
+        };
+        return t;
+    }
+};
+struct ScionJFactory : public vesk::IScionFactory
+{
+    ScionJFactory()
+    {
+        vesk::RegisterScion(vesk::GetIpcInterfaceName<J>(),this);
+    }
+    ~ScionJFactory()
+    {
+        vesk::UnregisterScion(vesk::GetIpcInterfaceName<J>());
+    }
+    virtual vesk::Scion* CreateScion()
+    {
+        return new ScionJ;
+    }
+};
+void _Register_ScionJ()
+{
+    static ScionJFactory s;
+}
+} // n
+)");
+  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t0.cpp"),
+            (std::vector<std::string>{"n::J", "n::StubJ", "n::ScionJ"}));
+}
+
+TEST_F(RemoteTest, RmiIsAStubAndASkeleton) {
+  const std::string tail = Tail(Declared("ipc rmi"));
+  EXPECT_EQ(Section(tail, "Result_back", "\n"), "(vesk::InputArchive& _ar, void** _p)");
+  EXPECT_EQ(Section(tail, "struct SkeletonJ", "    void Thunk1()"), R"( : vesk::Skeleton
+{
+    SkeletonJ() : vesk::Skeleton(GetSkeletonThunkFnTable(),3) {}
+    vesk::ptr<J> Invoke()
+    {
+        return vesk::ptr<J>(m_delegate.m_self, m_delegate.m_table);
+    }
+    void Thunk0()
+    {
+        Pop();
+        Invoke()->none();
+    }
+)");
+  EXPECT_EQ(Section(tail, "sThunk1(void* _self)", "            &sThunk0"), R"( { ((SkeletonJ*)_self)->Thunk1(); }
+    static void sThunk2(void* _self) { ((SkeletonJ*)_self)->Thunk2(); }
+    static const vesk::SkeletonThunkFn* GetSkeletonThunkFnTable()
+    {
+        static const vesk::SkeletonThunkFn t[] =
+        {
+)");
+  EXPECT_EQ(Section(tail, "struct SkeletonJFactory : public ", "\n    ~"),
+            "vesk::ISkeletonFactory\n{\n    SkeletonJFactory()\n    {\n"
+            "        vesk::RegisterSkeleton(vesk::GetIpcInterfaceName<J>(),this);\n    }");
+  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t0.cpp"),
+            (std::vector<std::string>{"n::J", "n::StubJ", "n::SkeletonJ"}));
+}
+
+// A remote interface needs its stubs also where it has no record.
+TEST_F(RemoteTest, WithoutReflection) {
+  const std::string declarations = "$interface rmi J { };\n";
+  const std::string header = Header(declarations);
+  EXPECT_EQ(Section(header, "struct JDelegatorMixin : public BC\n", "\n\nnamespace"),
+            "{\n};\n\ninline vesk::ConstStringZ _GetIpcInterfaceName(J const*) { return \"J\"; }");
+  EXPECT_EQ(Section(header, "InterfaceTypeTraits<J>\n", "} // namespace vesk"),
+            "{\n    static const bool is_ipc = true;\n    static const bool is_rmi = true;\n};\n");
+  EXPECT_EQ(Section(Tail(declarations), "", "    StubJ() : Stub(vesk::ptr<J>(this),0) {}\n"),
+            "\n//### Registration of stub/scion of $interface J\nstruct StubJ : vesk::Stub\n{\n");
+}
+
+TEST_F(RemoteTest, Faults) {
+  const struct {
+    const char *member, *fault;
+  } kFaults[] = {
+      {"void f(int32 a);", "[in] or [out] expected when read int32"},
+      {"void f([by] int32 a);", "in,out,inout or copy expected when read by"},
+      {"void f([in int32 a);", "Expected ] after in when read int32"},
+      {"void f([in] int32& a);", "in parameter a passed by reference"},
+      {"void f([in] int32* a);", "in parameter a : cannot marshall pointer type"},
+      {"void f([in] int32* const& a);", "in parameter a : cannot marshall pointer type"},
+      {"void f([out] int32 a);", "out parameter a must be passed by reference"},
+      {"void f([out] const int32& a);", "out parameter a cannot be passed by const reference"},
+      {"void f([inout] int32* a);", "out parameter a must be passed by reference"},
+      {"void f([copy] int32 a);", "copy parameter a must be passed by pointer"},
+      {"void f([copy] const int32* a);", "copy parameter a cannot be passed by pointer to const"},
+      {"void f([copy] int32** a);", "'copy' parameter a : cannot marshall pointer type"},
+      {"int32 f();", "Return type vesk::int32 invalid - must be void"},
+      {"int32 a;", "Attributes currently not supported on IPC interfaces"},
+  };
+  for (const auto& [member, fault] : kFaults) {
+    EXPECT_EQ(FaultOf("$interface ipc I {\n" + std::string(member) + " };"), "2: " + std::string(fault)) << member;
+  }
+}
+
+}  // namespace
+
+}  // namespace qrex
