@@ -27,7 +27,8 @@ class AccessorsTest : public TranslateTest {
       "$interface+ I : vesk::IObject { };\n$enum E { e1 };\n$model Inner { bool y; };\n$typedef int32 Number;\n";
 
   std::string Mixin(const std::string& head, const std::string& field) {
-    const std::string header = Header(kDeclared + "$class K" + head + " : model { " + field + "; } { };\n");
+    const std::string header =
+        TranslateHeader(kDeclared + "$class K" + head + " : model { " + field + "; } { };\n").header;
     return Section(header, "struct K_model_mixin : public BC\n", "};\ntypedef");
   }
   // The reading accessor of x behind its name, and what stands behind it.
@@ -39,7 +40,7 @@ class AccessorsTest : public TranslateTest {
   }
   // Parameters and body of the function that writes the path of the field, or of its element, as `name` says.
   std::string Path(const std::string& field, const std::string& name) {
-    return Section(Header(kDeclared + "$model M { " + field + " };\n"),
+    return Section(TranslateHeader(kDeclared + "$model M { " + field + " };\n").header,
                    "static void Get" + name + "Path(vesk::Path& _path", "}\n");
   }
 };
@@ -360,7 +361,7 @@ TEST_F(AccessorsTest, ForwardersOfAKeyProxy) {
 TEST_F(AccessorsTest, NestingIsBounded) {
   std::string type = "bool";
   for (int i = 0; i < 60; ++i) type = "DynArray<" + type + " >";
-  EXPECT_EQ(FaultOf("$model M { " + type + " x; };"), "1: Field x : type nested too deeply");
+  AssertErrors({{"$model M { " + type + " x; };", "(1) : error : Field x : type nested too deeply"}});
 }
 
 }  // namespace

@@ -20,7 +20,7 @@ $interface+ D : K, L
 )";
 
 TEST_F(InterfacesTest, DiamondWithAttributes) {
-  EXPECT_EQ(Section(Header(kDiamond), "struct D\n", ""), R"({
+  EXPECT_EQ(Section(TranslateHeader(kDiamond).header, "struct D\n", ""), R"({
     struct FnTable
     {
         K::FnTable _K;
@@ -153,7 +153,7 @@ template<> struct _is_indirect_superinterface_of<A,D> { static const bool value 
 } // namespace vesk
 
 )");
-  EXPECT_EQ(Section(Tail(kDiamond), "_GetReflected(D const*)\n", "    \n    // Registration"), R"(    {
+  EXPECT_EQ(Section(TranslateHeader(kDiamond).tail, "_GetReflected(D const*)\n", "    \n    // Registration"), R"(    {
         static vesk::ConstStringZ D_bases[] =
         {
             "K",
@@ -287,23 +287,23 @@ TEST_F(InterfacesTest, AttributesBecomeMethods) {
   const std::string declared =
       "$typedef int32 Number;\n$typedef const int32 ConstNumber;\n$struct Plain { };\n$model Pos { bool y; };\n";
   for (const auto& [attribute, slots] : kAttributes) {
-    std::string text = Section(Header(declared + "$interface I { " + attribute + "; };\n"),
+    std::string text = Section(TranslateHeader(declared + "$interface I { " + attribute + "; };\n").header,
                                "struct I\n{\n    struct FnTable\n    {\n", "    };\n");
     for (size_t indent; (indent = text.find("        ")) != text.npos;) text.erase(indent, 8);
     EXPECT_EQ(text, slots) << attribute;
   }
   // What is noted of the attribute is noted of what its method answers.
-  EXPECT_EQ(Section(Tail("$interface+ I { const int32 : [ 7 ] x; };\n"), "I_Getx_return[] =\n", ";"),
+  EXPECT_EQ(Section(TranslateHeader("$interface+ I { const int32 : [ 7 ] x; };\n").tail, "I_Getx_return[] =\n", ";"),
             "        {\n            0x04\n        }");
-  EXPECT_EQ(Section(Tail("$interface+ I { int32 : [ 7 ] x; };\n"), "I_Setx_x[] =\n", ";"),
+  EXPECT_EQ(Section(TranslateHeader("$interface+ I { int32 : [ 7 ] x; };\n").tail, "I_Setx_x[] =\n", ";"),
             "        {\n            0xe1,0xa2,0x07,0x00,0x00,0x00,0x04\n        }");
 }
 
 // In a handle the key proxies answer by value; a constant attribute keeps the const operator[] alone.
 TEST_F(InterfacesTest, ProxiesOfAttributes) {
-  EXPECT_EQ(
-      Section(Header("$interface I { const xmap<string8,string8> m; };\n"), "    union\n    {\n", "        void*"),
-      R"(        struct
+  EXPECT_EQ(Section(TranslateHeader("$interface I { const xmap<string8,string8> m; };\n").header, "    union\n    {\n",
+                    "        void*"),
+            R"(        struct
         {
             operator vesk::xmap<vesk::string8,vesk::string8 > const() const { return CONST_ATTRIB_CAST(I,m)->Getm(); }
             struct mElement
@@ -326,12 +326,13 @@ TEST_F(InterfacesTest, ProxiesOfAttributes) {
 }
 
 TEST_F(InterfacesTest, Empty) {
-  EXPECT_EQ(Section(Header("$interface I { };\n"), "        static const FnTable& GetTable()\n", "    };\n    \n"),
+  EXPECT_EQ(Section(TranslateHeader("$interface I { };\n").header, "        static const FnTable& GetTable()\n",
+                    "    };\n    \n"),
             "        {\n            static const FnTable t = {};\n            return t;\n        }\n");
 }
 
 TEST_F(InterfacesTest, Nested) {
-  const std::string header = Header("$class C\n{\n    $interface I { void f(); };\n    int x;\n};\n");
+  const std::string header = TranslateHeader("$class C\n{\n    $interface I { void f(); };\n    int x;\n};\n").header;
   EXPECT_EQ(Section(header, "class C\n{\n", "        void (__stdcall"), "    struct I\n{\n    struct FnTable\n    {\n");
   EXPECT_EQ(Section(header, "{ BC::GetI().f(); }\n", "\npublic"), "};\n\n    int x;\n");
   EXPECT_EQ(header.find("TypeTraits<I>"), header.npos);
@@ -340,19 +341,19 @@ TEST_F(InterfacesTest, Nested) {
 TEST_F(InterfacesTest, ClassThatImplementsADerivedInterface) {
   const std::string declarations =
       "$interface+ A : vesk::IObject { };\n$interface+ B : A { };\n$interface U { };\n$class+ K isa U, B { };\n";
-  const std::string header = Header(declarations);
-  EXPECT_EQ(trace,
-            "app/src/t0.h(5) : warning W1003 : isa on $interface U doesn't inherit from IObject\n"
-            "app/src/t0.h(4) : see declaration of $interface U\n"
-            "app/src/t0.h(5) : warning W1013 : isa on $interface U not reflected\n"
-            "app/src/t0.h(4) : see declaration of $interface U\n");
+  const std::string header = TranslateHeader(declarations).header;
+  EXPECT_EQ(Messages(),
+            "t.h(5) : warning W1003 : isa on $interface U doesn't inherit from IObject\n"
+            "t.h(4) : see declaration of $interface U\n"
+            "t.h(5) : warning W1013 : isa on $interface U not reflected\n"
+            "t.h(4) : see declaration of $interface U\n");
   EXPECT_EQ(Section(header, "using_model_base_class = 0;\n};\n", "} // namespace vesk"),
             R"(template<> struct directly_implements_interface<K,U> { static const bool value = true; };
 template<> struct directly_implements_interface<K,B> { static const bool value = true; };
 template<> struct indirectly_implements_interface<K,vesk::IObject> { static const bool value = true; };
 template<> struct indirectly_implements_interface<K,A> { static const bool value = true; };
 )");
-  const std::string tail = Tail(declarations);
+  const std::string tail = TranslateHeader(declarations).tail;
   EXPECT_EQ(Section(tail, "//### $class+ K\nnamespace vesk { XTarget* app_GetXTarget(); }\n", "            1,\n"),
             R"(    vesk::ptr<vesk::IObject> __stdcall K::sfnCreateInstance()
     {
@@ -385,50 +386,49 @@ template<> struct indirectly_implements_interface<K,A> { static const bool value
         return &_GetReflected( (K*) 0);
     }
 )");
-  EXPECT_EQ(Section(Header("$class P isa vesk::IPersistable { };\n"), "namespace vesk\nclass P : public ", "\n"),
+  EXPECT_EQ(Section(TranslateHeader("$class P isa vesk::IPersistable { };\n").header,
+                    "namespace vesk\nclass P : public ", "\n"),
             "vesk::PersistableMixin<vesk::IObjectBaseMixin<P,vesk::EmptyBase>>");
 }
 
 TEST_F(InterfacesTest, Warnings) {
-  Header(R"($interface U { };
+  TranslateHeader(R"($interface U { };
 $interface+ A : vesk::IObject { };
 $interface B << -register >> : U { };
 $interface+ C : U, A { };
 $interface D : A { };
 )");
-  EXPECT_EQ(trace,
-            "app/src/t0.h(4) : warning W1004 : $interface B is not reflected and has redundant << >> directives\n"
-            "app/src/t0.h(5) : warning W1006 : Inconsistent subtyping of IObject in base interfaces\n"
+  EXPECT_EQ(Messages(),
+            "t.h(4) : warning W1004 : $interface B is not reflected and has redundant << >> directives\n"
+            "t.h(5) : warning W1006 : Inconsistent subtyping of IObject in base interfaces\n"
             "    $interface U doesn't subtype IObject\n"
             "    $interface+ A subtypes IObject\n"
-            "app/src/t0.h(2) : see declaration of $interface U\n"
-            "app/src/t0.h(3) : see declaration of $interface+ A\n"
-            "app/src/t0.h(5) : warning W1002 : Reflected $interface+ C references non-registered $interface U\n"
-            "app/src/t0.h(2) : see declaration of $interface U\n"
-            "app/src/t0.h(6) : warning W1007 : $interface D subtypes IObject but isn't reflected\n");
+            "t.h(2) : see declaration of $interface U\n"
+            "t.h(3) : see declaration of $interface+ A\n"
+            "t.h(5) : warning W1002 : Reflected $interface+ C references non-registered $interface U\n"
+            "t.h(2) : see declaration of $interface U\n"
+            "t.h(6) : warning W1007 : $interface D subtypes IObject but isn't reflected\n");
 }
 
 TEST_F(InterfacesTest, Faults) {
-  const struct {
-    const char *declarations, *fault;
-  } kFaults[] = {
-      {"$interface+ + I { };", "1: '+' modifier repeated"},
-      {"$class C {\n$interface+ I { }; };", "2: '+' modifier not permitted on nested interface"},
-      {"$class C {\n$interface ipc I { }; };", "2: 'ipc' modifier not permitted on nested interface"},
-      {"$class C {\n$interface rmi I { }; };", "2: 'rmi' modifier not permitted on nested interface"},
-      {"$struct I { };\n$interface I { };", "2: $interface I conflicts with previous declaration of $struct I"},
-      {"$interface I { };\n$interface I { };", "2: Repeated definition of $interface I"},
-      {"$interface I << abstract >> { };", "1: Unrecognised qualifier << abstract >> on $interface I"},
-      {"$interface I : { };", "1: Expected identifier after : when read {"},
-      {"$struct S { };\n$interface I : S { };", "2: Base interface name expected when read $struct S"},
-      {"$interface J { };\n$interface I : J J { };", "2: Expected , or { after J when read J"},
-      {"$interface I : I { };", "1: $interface I can't be its own base"},
-      {"$interface I [ ] { };", "1: Expected { after I when read ["},
-      {"$interface I {\nvoid f() }; ", "2: Expected ; after ) when read }"},
-      {"$interface I {\nvoid f(); }\nint", "3: ; expected after definition of $interface I when read int"},
-      {"$model M { xvector<M> m; };\n$interface I { M a; };", "2: Attribute a : $model M contains itself"},
-  };
-  for (const auto& [declarations, fault] : kFaults) EXPECT_EQ(FaultOf(declarations), fault) << declarations;
+  AssertErrors({
+      {"$interface+ + I { };", "(1) : error : '+' modifier repeated"},
+      {"$class C {\n$interface+ I { }; };", "(2) : error : '+' modifier not permitted on nested interface"},
+      {"$class C {\n$interface ipc I { }; };", "(2) : error : 'ipc' modifier not permitted on nested interface"},
+      {"$class C {\n$interface rmi I { }; };", "(2) : error : 'rmi' modifier not permitted on nested interface"},
+      {"$struct I { };\n$interface I { };",
+       "(2) : error : $interface I conflicts with previous declaration of $struct I"},
+      {"$interface I { };\n$interface I { };", "(2) : error : Repeated definition of $interface I"},
+      {"$interface I << abstract >> { };", "(1) : error : Unrecognised qualifier << abstract >> on $interface I"},
+      {"$interface I : { };", "(1) : error : Expected identifier after : when read {"},
+      {"$struct S { };\n$interface I : S { };", "(2) : error : Base interface name expected when read $struct S"},
+      {"$interface J { };\n$interface I : J J { };", "(2) : error : Expected , or { after J when read J"},
+      {"$interface I : I { };", "(1) : error : $interface I can't be its own base"},
+      {"$interface I [ ] { };", "(1) : error : Expected { after I when read ["},
+      {"$interface I {\nvoid f() }; ", "(2) : error : Expected ; after ) when read }"},
+      {"$interface I {\nvoid f(); }\nint", "(3) : error : ; expected after definition of $interface I when read int"},
+      {"$model M { xvector<M> m; };\n$interface I { M a; };", "(2) : error : Attribute a : $model M contains itself"},
+  });
 }
 
 }  // namespace

@@ -28,7 +28,9 @@ $class+ K : mixin
 )";
 
 TEST_F(MixinsTest, NamedMixin) {
-  EXPECT_EQ(Section(Header(kListOfEverySort), "template <typename BC>\nstruct M : public BC\n", "struct Pos\n"), R"({
+  EXPECT_EQ(Section(TranslateHeader(kListOfEverySort).header, "template <typename BC>\nstruct M : public BC\n",
+                    "struct Pos\n"),
+            R"({
     typedef BC BaseClass;
 
     vesk::int32 a;
@@ -48,7 +50,7 @@ template <typename BC> vesk::TypeOps const& _GetTypeOps(M const*)
 }
 
 TEST_F(MixinsTest, ListOfEverySortOfEntry) {
-  const std::string header = Header(kListOfEverySort);
+  const std::string header = TranslateHeader(kListOfEverySort).header;
   EXPECT_EQ(Section(header, "struct K_Mixin_0 : public BC\n", "    bool operator<"), R"({
     typedef BC BaseClass;
     using typename BC::FinalClass;
@@ -95,7 +97,7 @@ vesk::TypeOps const& _GetTypeOps(K const*);
 
 // What a mixin reflects stands in the record of the class; the model of an entry is reached through its _model_.
 TEST_F(MixinsTest, RecordOfAClassWithMixins) {
-  const std::string tail = Tail(kListOfEverySort);
+  const std::string tail = TranslateHeader(kListOfEverySort).tail;
   EXPECT_EQ(Section(tail, "vesk::ReflectedClass const& _GetReflected(K const*)\n", kTypeOps),
             R"(    {
         static const vesk::octet_t K_a[] =
@@ -137,11 +139,13 @@ TEST_F(MixinsTest, RecordOfAClassWithMixins) {
 }
 
 TEST_F(MixinsTest, BasesAroundAList) {
-  EXPECT_EQ(Section(Header("$struct K : public B, C mixin [ ] D, E : [ 7 ] { };\n"), "struct K__BASE", "\n{"),
-            " : public B, C {};\nstruct K;\n\nnamespace vesk");
-  EXPECT_EQ(Section(Header("$mixin M : B mixin [ ? X ] { };\n"), "template <typename BC>\n", "\npublic"),
-            "struct M__BASE : BC,B {};\ntemplate <typename BC>\nstruct M : public X <M__BASE<BC> >\n\n{\n"
-            "    typedef X <M__BASE<BC> > BaseClass;\n ");
+  EXPECT_EQ(
+      Section(TranslateHeader("$struct K : public B, C mixin [ ] D, E : [ 7 ] { };\n").header, "struct K__BASE", "\n{"),
+      " : public B, C {};\nstruct K;\n\nnamespace vesk");
+  EXPECT_EQ(
+      Section(TranslateHeader("$mixin M : B mixin [ ? X ] { };\n").header, "template <typename BC>\n", "\npublic"),
+      "struct M__BASE : BC,B {};\ntemplate <typename BC>\nstruct M : public X <M__BASE<BC> >\n\n{\n"
+      "    typedef X <M__BASE<BC> > BaseClass;\n ");
 }
 
 TEST_F(MixinsTest, AdtAndItsImplementation) {
@@ -151,7 +155,7 @@ TEST_F(MixinsTest, AdtAndItsImplementation) {
     void set(const string8& s);
 };
 )";
-  EXPECT_EQ(Section(Header(adt), "", "template<> struct ClassTypeTraits"), R"(struct A;
+  EXPECT_EQ(Section(TranslateHeader(adt).header, "", "template<> struct ClassTypeTraits"), R"(struct A;
 vesk::ReflectedClass const& _GetReflected(A const*);
 vesk::TypeOps const& _GetTypeOps(A const*);
 
@@ -170,8 +174,7 @@ template<> struct TypeTraits<A>
     static const bool has_metadata = 1;
 };
 )");
-  AddFile("a.h", kImport + adt);
-  EXPECT_EQ(Section(Translate("a.cpp", R"(@import "a.h"
+  EXPECT_EQ(Section(Translate("a.cpp", R"(@import "t.h"
 $adt+ implement A
 {
     int n;
@@ -180,7 +183,7 @@ $adt+ implement A
 };
 int behind;
 )"),
-                    "#include \"a.h\"\n", kTypeOps),
+                    "#include \"t.h\"\n", kTypeOps),
             R"(struct A
 {
     int n;
@@ -246,48 +249,48 @@ namespace vesk { XTarget* app_GetXTarget(); }
 TEST_F(MixinsTest, Implementing) {
   const std::string declared =
       "$interface+ I : vesk::IObject { int32 f(int32 a=1) const; void g(); };\n$adt A { void h(string8 s); };\n";
-  EXPECT_EQ(
-      Section(Header(declared + "$class K isa I { $implementing I { g f }, adt A; };\n"), " BaseClass;\n", "\npublic"),
-      " void g();\nvesk::int32 f(vesk::int32 a=1) const;\nvoid h(vesk::string8 s);\n ");
-  EXPECT_EQ(trace, "");
-  EXPECT_EQ(Section(Header(declared + "$class K { $implementing I; };\n"), "class K\n{", "\npublic"),
+  EXPECT_EQ(Section(TranslateHeader(declared + "$class K isa I { $implementing I { g f }, adt A; };\n").header,
+                    " BaseClass;\n", "\npublic"),
+            " void g();\nvesk::int32 f(vesk::int32 a=1) const;\nvoid h(vesk::string8 s);\n ");
+  EXPECT_EQ(Messages(), "");
+  EXPECT_EQ(Section(TranslateHeader(declared + "$class K { $implementing I; };\n").header, "class K\n{", "\npublic"),
             " vesk::int32 f(vesk::int32 a=1) const;\nvoid g();\n ");
-  EXPECT_EQ(trace,
-            "app/src/t1.h(4) : warning W1014 : $class K implementing $interface+ I without associated 'isa'\n"
-            "app/src/t1.h(2) : see declaration of $interface+ I\n");
+  EXPECT_EQ(Messages(),
+            "t.h(4) : warning W1014 : $class K implementing $interface+ I without associated 'isa'\n"
+            "t.h(2) : see declaration of $interface+ I\n");
 }
 
 TEST_F(MixinsTest, Faults) {
-  const struct {
-    const char *declarations, *fault;
-  } kFaults[] = {
-      {"$class C { };\n$class K : mixin [ C ] { };", "2: $class C is not a $mixin or $model"},
-      {"$interface I { };\n$class K : mixin [\nI\n] { };", "3: $interface I is not a $class or $struct"},
-      {"$class K : mixin [ X ] { };", "1: Unrecognised identifier : X"},
-      {"$mixin M { };\n$class K : mixin [ M, M ] { };", "2: Expected identifier after M when read ,"},
-      {"$class K : mixin [ ? 5 ] { };", "1: Expected mixin name when read 5"},
-      {"$class K : mixin [ ? a::\n5 ] { };", "2: Expected identifier after a:: when read 5"},
-      {"$class K : mixin [\nmodel\n+ ] { };", "2: Expected { after 'model' when read +"},
-      {"$class K : mixin [ ?\nM<int", "2: Met EOS before read matching angled bracket"},
-      {"$class K : mixin { };", "1: Expected [ after mixin when read {"},
-      {"$class K mixin [ ] { };", "1: Expected : after K when read mixin"},
-      {"$adt A {\nint32 f();", "2: Met EOS before read matching brace"},
-      {"$adt A : { };", "1: Expected [ after : when read {"},
-      {"$adt A { int32 f(); }\nint", "2: ; expected after definition of $adt A when read int"},
-      {"$adt A { };\n$adt A { };", "2: Repeated definition of $adt A"},
-      {"$adt implement A { };", "1: Can't implement undefined $adt A"},
-      {"$adt A;\n$adt implement A { };", "2: Can't implement undefined $adt A"},
-      {"$adt A { };\n$adt implement A { };\n$adt implement A { };", "3: Repeated implementation of $adt A"},
-      {"$adt A { };\n$adt implement A;", "2: Forward declaration of $adt A incompatible with 'implements'"},
-      {"$class implement A { };", "1: 'implement' modifier only permitted on $adt"},
-      {"$class K { $implementing K; };", "1: $interface identifier expected when read $class K"},
-      {"$interface I { };\n$class K { $implementing\nadt I; };", "3: $adt identifier expected when read $interface I"},
-      {"$interface I { };\n$class K { $implementing I -f; };", "2: - not supported"},
-      {"$interface I { void f(); };\n$class K { $implementing I { f\ng }; };", "3: $interface I has no method named g"},
-      {"$interface I { };\n$class K { $implementing I { 5 }; };", "2: Expected identifier after { when read 5"},
-      {"$interface I { };\n$class K { $implementing I { } x", "2: Expected , or ; after } when read x"},
-  };
-  for (const auto& [declarations, fault] : kFaults) EXPECT_EQ(FaultOf(declarations), fault) << declarations;
+  AssertErrors({
+      {"$class C { };\n$class K : mixin [ C ] { };", "(2) : error : $class C is not a $mixin or $model"},
+      {"$interface I { };\n$class K : mixin [\nI\n] { };", "(3) : error : $interface I is not a $class or $struct"},
+      {"$class K : mixin [ X ] { };", "(1) : error : Unrecognised identifier : X"},
+      {"$mixin M { };\n$class K : mixin [ M, M ] { };", "(2) : error : Expected identifier after M when read ,"},
+      {"$class K : mixin [ ? 5 ] { };", "(1) : error : Expected mixin name when read 5"},
+      {"$class K : mixin [ ? a::\n5 ] { };", "(2) : error : Expected identifier after a:: when read 5"},
+      {"$class K : mixin [\nmodel\n+ ] { };", "(2) : error : Expected { after 'model' when read +"},
+      {"$class K : mixin [ ?\nM<int", "(2) : error : Met EOS before read matching angled bracket"},
+      {"$class K : mixin { };", "(1) : error : Expected [ after mixin when read {"},
+      {"$class K mixin [ ] { };", "(1) : error : Expected : after K when read mixin"},
+      {"$adt A {\nint32 f();", "(2) : error : Met EOS before read matching brace"},
+      {"$adt A : { };", "(1) : error : Expected [ after : when read {"},
+      {"$adt A { int32 f(); }\nint", "(2) : error : ; expected after definition of $adt A when read int"},
+      {"$adt A { };\n$adt A { };", "(2) : error : Repeated definition of $adt A"},
+      {"$adt implement A { };", "(1) : error : Can't implement undefined $adt A"},
+      {"$adt A;\n$adt implement A { };", "(2) : error : Can't implement undefined $adt A"},
+      {"$adt A { };\n$adt implement A { };\n$adt implement A { };", "(3) : error : Repeated implementation of $adt A"},
+      {"$adt A { };\n$adt implement A;", "(2) : error : Forward declaration of $adt A incompatible with 'implements'"},
+      {"$class implement A { };", "(1) : error : 'implement' modifier only permitted on $adt"},
+      {"$class K { $implementing K; };", "(1) : error : $interface identifier expected when read $class K"},
+      {"$interface I { };\n$class K { $implementing\nadt I; };",
+       "(3) : error : $adt identifier expected when read $interface I"},
+      {"$interface I { };\n$class K { $implementing I -f; };", "(2) : error : - not supported"},
+      {"$interface I { void f(); };\n$class K { $implementing I { f\ng }; };",
+       "(3) : error : $interface I has no method named g"},
+      {"$interface I { };\n$class K { $implementing I { 5 }; };",
+       "(2) : error : Expected identifier after { when read 5"},
+      {"$interface I { };\n$class K { $implementing I { } x", "(2) : error : Expected , or ; after } when read x"},
+  });
 }
 
 }  // namespace

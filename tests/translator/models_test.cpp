@@ -7,7 +7,7 @@ namespace {
 using ModelsTest = TranslateTest;
 
 TEST_F(ModelsTest, WithoutSchema) {
-  EXPECT_EQ(Section(Header("$model Point\n{\n    string8 name;\n};\n"), "", "\nnamespace vesk\n"),
+  EXPECT_EQ(Section(TranslateHeader("$model Point\n{\n    string8 name;\n};\n").header, "", "\nnamespace vesk\n"),
             R"(struct Point
 {
     
@@ -178,7 +178,7 @@ constexpr char kThreeReleases[] = R"($model Record
 )";
 
 TEST_F(ModelsTest, ThreeReleases) {
-  EXPECT_EQ(Tail(kThreeReleases), R"(
+  EXPECT_EQ(TranslateHeader(kThreeReleases).tail, R"(
 //### $model Record
 namespace vesk { XTarget* app_GetXTarget(); }
 namespace vesk { RSN app_GetModelRsn(); }
@@ -225,7 +225,8 @@ namespace vesk { RSN app_GetModelRsn(); }
 
 TEST_F(ModelsTest, RecordOfThreeReleases) {
   const std::string declarations = std::string(kThreeReleases).replace(0, 6, "$model+");
-  EXPECT_EQ(Section(Tail(declarations), "_modelFields[] =\n", "static const vesk::ReflectedClass"), R"(        {
+  EXPECT_EQ(Section(TranslateHeader(declarations).tail, "_modelFields[] =\n", "static const vesk::ReflectedClass"),
+            R"(        {
             { "a", offsetof(Record,a), Record_a, 1, -1 },
             { "b", -1, Record_b, 1, 3 },
             { "c", offsetof(Record,c), Record_c, 3, -1 },
@@ -237,13 +238,14 @@ TEST_F(ModelsTest, RecordOfThreeReleases) {
 }
 
 TEST_F(ModelsTest, SchemaOfOneReleaseIsTheSimpleForm) {
-  const std::string tail = Tail("$model M { int32 a; int32 b; $schema { 4: +b +a } };\n");
+  const std::string tail = TranslateHeader("$model M { int32 a; int32 b; $schema { 4: +b +a } };\n").tail;
   EXPECT_EQ(Section(tail, "Deserialise(vesk::InputArchive& _ar)\n", ""),
             "    {\n        _ar >> this->b\n           >> this->a;\n    }\n");
 }
 
 TEST_F(ModelsTest, Comparisons) {
-  EXPECT_EQ(Section(Header("$model M { bool a; bool b; bool c; };\n"), "    bool operator<", "    bool operator!="),
+  EXPECT_EQ(Section(TranslateHeader("$model M { bool a; bool b; bool c; };\n").header, "    bool operator<",
+                    "    bool operator!="),
             R"((M const& _rhs) const
     {
         return (a < _rhs.a || (a == _rhs.a &&
@@ -257,7 +259,7 @@ TEST_F(ModelsTest, Comparisons) {
         c == _rhs.c;
     }
 )");
-  const std::string empty = Header("$model M { };\n");
+  const std::string empty = TranslateHeader("$model M { };\n").header;
   EXPECT_EQ(Section(empty, "    bool operator<", "    bool operator!="),
             "(M const& _rhs) const\n    {\n        return true;\n    }\n"
             "    bool operator==(M const& _rhs) const\n    {\n        return true;\n    }\n");
@@ -266,7 +268,7 @@ TEST_F(ModelsTest, Comparisons) {
 }
 
 TEST_F(ModelsTest, Constructors) {
-  EXPECT_EQ(Section(Header(R"($enum E { e1 };
+  EXPECT_EQ(Section(TranslateHeader(R"($enum E { e1 };
 $model M
 {
     E kind;
@@ -276,7 +278,8 @@ $model M
     explicit $$(bool* f)  : flag(f) { n = 1; }
     $$(int a, int b) { }
 };
-)"),
+)")
+                        .header,
                     "struct M\n", "    M(E const&"),
             R"({
     explicit M(bool* f)  : flag(f) { n = 1; }
@@ -285,13 +288,14 @@ $model M
     M() : kind((E)0),flag(0),n(0) {}
 )");
   // A default constructor of its own takes the place of the generated one; a single field makes the other explicit.
-  EXPECT_EQ(Section(Header("$model M { int32 a; $$() { a = 7; } };\n"), "struct M\n", "    void Serialise"),
-            "{\n    M() { a = 7; }\n    \n    explicit M(vesk::int32 const& a_) : a(a_) {}\n");
+  EXPECT_EQ(
+      Section(TranslateHeader("$model M { int32 a; $$() { a = 7; } };\n").header, "struct M\n", "    void Serialise"),
+      "{\n    M() { a = 7; }\n    \n    explicit M(vesk::int32 const& a_) : a(a_) {}\n");
 }
 
 TEST_F(ModelsTest, ClassOfNamedModel) {
   const std::string declarations = "$model M { xset<int32> s; };\n$class K : model M\n{\n    int more;\n};\n";
-  const std::string header = Header(declarations);
+  const std::string header = TranslateHeader(declarations).header;
   const std::string mixin = Section(header, "struct K_model_mixin : public BC\n", "namespace vesk");
   EXPECT_EQ(Section(mixin, "    typedef M model_type;\n", ""), R"(    M const& model() const { return _model_; }
     M& model() { return _model_; }
@@ -328,7 +332,7 @@ template<typename Archive> inline void Deserialise(Archive& _ar,K& _x) { _x.Dese
 inline vesk::xostream& operator<<(vesk::xostream& _os,K const& _x) { _os << _x._model_; return _os; }
 
 )");
-  EXPECT_EQ(Section(Tail(declarations), "//### $class K\n", "//### $model M\n"),
+  EXPECT_EQ(Section(TranslateHeader(declarations).tail, "//### $class K\n", "//### $model M\n"),
             R"(namespace vesk { XTarget* app_GetXTarget(); }
 namespace vesk
 {
@@ -360,7 +364,7 @@ $struct+ S << multiline >> isa I : model
 {
 };
 )";
-  const std::string header = Header(declarations);
+  const std::string header = TranslateHeader(declarations).header;
   EXPECT_EQ(Section(header, "struct S_model\n", "bool operator<"), R"({
     
     S_model() : n(0) {}
@@ -383,7 +387,7 @@ $struct+ S << multiline >> isa I : model
 }
 
 )");
-  const std::string tail = Tail(declarations);
+  const std::string tail = TranslateHeader(declarations).tail;
   EXPECT_EQ(Section(tail, "    void S_model::", "\n    // Registration"),
             R"(VisitObjects(vesk::IObjectVisitor& _v) const {_v << p;}
     void S_model::VisitPrefs(vesk::IPrefVisitor& _v) const {_v << p;}
@@ -413,93 +417,91 @@ $struct+ S << multiline >> isa I : model
             "            { \"n\", offsetof(S,_model_.n), S_n, 0, -1 },\n        ");
 }
 
-struct Fault {
-  const char* declarations;
-  const char* fault;
-};
-
 TEST_F(ModelsTest, FaultsOfTheBlock) {
-  const Fault kFaults[] = {
-      {"$model M {\nint32 a; $foo { } };", "2: $dropped or $schema expected when read $foo"},
-      {"$model M { int32 a;\n$dropped { } $evolve { } };", "2: $schema expected when read $evolve"},
-      {"$model M { int32 a; $dropped { }\n};", "2: Expected $schema after } when read }"},
-      {"$model M { int32 a; $schema { 1: +a }\n$foo { } };", "2: $evolve expected when read $foo"},
-      {"$model M { int32 a; $schema { 1: +a }\nint32 b; };", "2: Expected } after } when read int32"},
-      {"$model M { int32 a; $$() { }\nint32 b; };", "2: Expected } after } when read int32"},
-      {"$model M {\nint32 a;", "2: Met EOS before read matching brace for $model block"},
-      {"$model M {\nint32 a, b; };", "2: ; expected after field declaration when read ,"},
-      {"$model M { int32 a;\nstring8 a; };", "2: Repeated field name a"},
-      {"$model M { int32 a; $dropped {\nint32 a; } $schema { 1: +a } };", "2: Repeated field name a"},
-      {"$struct S { $int32 a; $model {\nint32 a; } };", "2: Repeated field name a"},
-      {"$model M {\nint32& a; };", "2: References not permitted within models"},
-      {"$model M {\nconst int32 a; };", "2: const or volatile qualifiers not permitted within models"},
-      {"$model M { int32 a;\nexplicit M(int32 a) { } };", "2: Expected $$ after explicit when read M"},
-      {"$model M { int32 a;\n$$(int32 b)", "2: Met EOS while scanning for '{'"},
-      {"$struct S { $model { int32 a; }\n$model { int32 b; } };", "2: Repeated model declaration"},
-      {"$struct N { };\n$class K : model N { };", "2: Not a model : {"},
-      {"$interface N { };\n$class K : model N { };", "2: Not a model : {"},
-      {"$model M\n<< -dc >> { };", "2: Qualifier <<-dc>> invalid for a $model"},
-      {"$model M { }\n$model N { };", "2: ; expected after definition of $model M when read $"},
-      {"$model M { int32 a;\nM b; };", "2: Field b : $model M contains itself"},
-      {"$model M;\n$model N { M m[]; };\n$model M { xmap<int32, N> n; };", "3: Field n : $model M contains itself"},
-  };
-  for (const Fault& fault : kFaults) EXPECT_EQ(FaultOf(fault.declarations), fault.fault) << fault.declarations;
+  AssertErrors({
+      {"$model M {\nint32 a; $foo { } };", "(2) : error : $dropped or $schema expected when read $foo"},
+      {"$model M { int32 a;\n$dropped { } $evolve { } };", "(2) : error : $schema expected when read $evolve"},
+      {"$model M { int32 a; $dropped { }\n};", "(2) : error : Expected $schema after } when read }"},
+      {"$model M { int32 a; $schema { 1: +a }\n$foo { } };", "(2) : error : $evolve expected when read $foo"},
+      {"$model M { int32 a; $schema { 1: +a }\nint32 b; };", "(2) : error : Expected } after } when read int32"},
+      {"$model M { int32 a; $$() { }\nint32 b; };", "(2) : error : Expected } after } when read int32"},
+      {"$model M {\nint32 a;", "(2) : error : Met EOS before read matching brace for $model block"},
+      {"$model M {\nint32 a, b; };", "(2) : error : ; expected after field declaration when read ,"},
+      {"$model M { int32 a;\nstring8 a; };", "(2) : error : Repeated field name a"},
+      {"$model M { int32 a; $dropped {\nint32 a; } $schema { 1: +a } };", "(2) : error : Repeated field name a"},
+      {"$struct S { $int32 a; $model {\nint32 a; } };", "(2) : error : Repeated field name a"},
+      {"$model M {\nint32& a; };", "(2) : error : References not permitted within models"},
+      {"$model M {\nconst int32 a; };", "(2) : error : const or volatile qualifiers not permitted within models"},
+      {"$model M { int32 a;\nexplicit M(int32 a) { } };", "(2) : error : Expected $$ after explicit when read M"},
+      {"$model M { int32 a;\n$$(int32 b)", "(2) : error : Met EOS while scanning for '{'"},
+      {"$struct S { $model { int32 a; }\n$model { int32 b; } };", "(2) : error : Repeated model declaration"},
+      {"$struct N { };\n$class K : model N { };", "(2) : error : Not a model : {"},
+      {"$interface N { };\n$class K : model N { };", "(2) : error : Not a model : {"},
+      {"$model M\n<< -dc >> { };", "(2) : error : Qualifier <<-dc>> invalid for a $model"},
+      {"$model M { }\n$model N { };", "(2) : error : ; expected after definition of $model M when read $"},
+      {"$model M { int32 a;\nM b; };", "(2) : error : Field b : $model M contains itself"},
+      {"$model M;\n$model N { M m[]; };\n$model M { xmap<int32, N> n; };",
+       "(3) : error : Field n : $model M contains itself"},
+  });
   // A vector of its own kind is no part of a model's path.
-  EXPECT_NE(Header("$model M { xvector<M> children; };").find("CreateIntochildren"), std::string::npos);
+  EXPECT_NE(TranslateHeader("$model M { xvector<M> children; };").header.find("CreateIntochildren"), std::string::npos);
 }
 
 TEST_F(ModelsTest, FaultsOfTheSchema) {
-  const Fault kFaults[] = {
-      {"a: +a", "1: Release number expected when read a"},
-      {"1: +a\n1: +b", "2: Unexpected release number 1 (must strictly increase)"},
-      {"3000000000: +a", "1: Unexpected release number -1294967296 (must strictly increase)"},
-      {"1 +a", "1: Expected : after 1 when read +"},
-      {"1: +a\n2:", "2: No schema changes specified"},
-      {"1: +5", "1: Expected field identifier after + when read 5"},
-      {"1: -5", "1: Expected field identifier after - when read 5"},
-      {"1: +z", "1: Field z not declared in the model"},
-      {"1: +a\n2: +a", "2: Field a already added in the schema"},
-      {"1: -d", "1: Field d can't be dropped from the schema until it has been added"},
-      {"1: +a +d\n2: -a", "2: Field a not declared as dropped"},
-      {"1: +a +d\n2: -z", "2: Field z not declared as dropped"},
-      {"1: +a +d\n2: -d\n3: -d", "3: Field d already dropped in the schema"},
+  std::vector<MessageCase> cases = {
+      {"a: +a", "(1) : error : Release number expected when read a"},
+      {"1: +a\n1: +b", "(2) : error : Unexpected release number 1 (must strictly increase)"},
+      {"3000000000: +a", "(1) : error : Unexpected release number -1294967296 (must strictly increase)"},
+      {"1 +a", "(1) : error : Expected : after 1 when read +"},
+      {"1: +a\n2:", "(2) : error : No schema changes specified"},
+      {"1: +5", "(1) : error : Expected field identifier after + when read 5"},
+      {"1: -5", "(1) : error : Expected field identifier after - when read 5"},
+      {"1: +z", "(1) : error : Field z not declared in the model"},
+      {"1: +a\n2: +a", "(2) : error : Field a already added in the schema"},
+      {"1: -d", "(1) : error : Field d can't be dropped from the schema until it has been added"},
+      {"1: +a +d\n2: -a", "(2) : error : Field a not declared as dropped"},
+      {"1: +a +d\n2: -z", "(2) : error : Field z not declared as dropped"},
+      {"1: +a +d\n2: -d\n3: -d", "(3) : error : Field d already dropped in the schema"},
       {"1: +a +d\n2: +b -d",
-       "2: Syntax error: unexpected '-' : note that dropped fields must appear before added fields within a schema"},
-      {"1: +a +b\n", "2: Field d never added in a schema"},
-      {"1: +a +d\n2: -d", "2: Field b never added in a schema"},
-      {"1: +a +b +d\n", "2: Field d never dropped in a schema"},
+       "(2) : error : Syntax error: unexpected '-' : note that dropped fields must appear before added fields within a "
+       "schema"},
+      {"1: +a +b\n", "(2) : error : Field d never added in a schema"},
+      {"1: +a +d\n2: -d", "(2) : error : Field b never added in a schema"},
+      {"1: +a +b +d\n", "(2) : error : Field d never dropped in a schema"},
   };
-  for (const auto& [schema, fault] : kFaults) {
-    EXPECT_EQ(FaultOf("$model M { int32 a; int32 b; $dropped { int32 d; } $schema { " + std::string(schema) + "} };"),
-              fault)
-        << schema;
+  for (MessageCase& schema : cases) {
+    schema.text = "$model M { int32 a; int32 b; $dropped { int32 d; } $schema { " + schema.text + "} };";
   }
-  EXPECT_EQ(FaultOf("$model M { int32 a; $schema {\n1: +a"), "2: Met EOS before read matching brace for $schema block");
+  cases.push_back(
+      {"$model M { int32 a; $schema {\n1: +a", "(2) : error : Met EOS before read matching brace for $schema block"});
+  AssertErrors(cases);
 }
 
 TEST_F(ModelsTest, FaultsOfTheEvolution) {
-  const Fault kFaults[] = {
-      {"5 { }", "1: Expected field identifier after { when read 5"},
-      {"z { }", "1: Field z not declared in the model"},
-      {"a { }", "1: Can't initialise field a that appeared in the first schema"},
-      {"c { c = 1; }\nc { c = 2; }", "2: Repeated initialisation code for field c"},
-      {"c(5) { }", "1: Expected identifier after ( when read 5"},
-      {"c(z) { }", "1: Field z not declared in the model"},
-      {"g(c) { }", "1: Field c not available in the schema just before g was added"},
-      {"c(e) { }", "1: Field e not available in the schema just before c was added"},
-      {"c(b;\na) { }", "1: Syntax error in dependency arg list : ;"},
-      {"c 5", "1: Expected { after c when read 5"},
-      {"e { e = 1; }\n", "2: Redundant initialisation of field e"},
+  std::vector<MessageCase> cases = {
+      {"5 { }", "(1) : error : Expected field identifier after { when read 5"},
+      {"z { }", "(1) : error : Field z not declared in the model"},
+      {"a { }", "(1) : error : Can't initialise field a that appeared in the first schema"},
+      {"c { c = 1; }\nc { c = 2; }", "(2) : error : Repeated initialisation code for field c"},
+      {"c(5) { }", "(1) : error : Expected identifier after ( when read 5"},
+      {"c(z) { }", "(1) : error : Field z not declared in the model"},
+      {"g(c) { }", "(1) : error : Field c not available in the schema just before g was added"},
+      {"c(e) { }", "(1) : error : Field e not available in the schema just before c was added"},
+      {"c(b;\na) { }", "(1) : error : Syntax error in dependency arg list : ;"},
+      {"c 5", "(1) : error : Expected { after c when read 5"},
+      {"e { e = 1; }\n", "(2) : error : Redundant initialisation of field e"},
   };
   const std::string model =
       "$model M { int32 a; int32 c; int32 g; $dropped { int32 b; int32 e; } "
       "$schema { 1: +a +b 3: +g +e 4: -e 5: -b +c } $evolve { ";
-  for (const auto& [evolve, fault] : kFaults) EXPECT_EQ(FaultOf(model + evolve + "} };"), fault) << evolve;
-  EXPECT_EQ(FaultOf(model + "\nc(b,"), "2: Met EOS in middle of arg list");
-  EXPECT_EQ(FaultOf(model + "\nc { c = 1;"), "2: Met EOS before read matching brace for $evolve block");
-  EXPECT_EQ(FaultOf(model + "\nc { c = 1; }"), "2: Met EOS before read matching brace for $evolve block");
+  for (MessageCase& entry : cases) entry.text = model + entry.text + "} };";
+  cases.push_back({model + "\nc(b,", "(2) : error : Met EOS in middle of arg list"});
+  for (const char* rest : {"\nc { c = 1;", "\nc { c = 1; }"}) {
+    cases.push_back({model + rest, "(2) : error : Met EOS before read matching brace for $evolve block"});
+  }
+  AssertErrors(cases);
   // An argument that goes in the very release of the field is at hand, and empty code is none.
-  EXPECT_NE(Header(model + "c(b) { } c(b) { c = b; } } };").find("struct M"), std::string::npos);
+  EXPECT_NE(TranslateHeader(model + "c(b) { } c(b) { c = b; } } };").header.find("struct M"), std::string::npos);
 }
 
 }  // namespace

@@ -20,7 +20,7 @@ class RemoteTest : public TranslateTest {
 };
 
 TEST_F(RemoteTest, IpcIsAStubAndAScion) {
-  EXPECT_EQ(Section(Tail(Declared("ipc")), "} // n\n", "\n//### $model Pos"), R"(
+  EXPECT_EQ(Section(TranslateHeader(Declared("ipc")).tail, "} // n\n", "\n//### $model Pos"), R"(
 //### Registration of stub/scion of $interface+ n::J
 namespace n
 {
@@ -143,12 +143,12 @@ void _Register_ScionJ()
 }
 } // n
 )");
-  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t0.cpp"),
+  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
             (std::vector<std::string>{"n::J", "n::StubJ", "n::ScionJ"}));
 }
 
 TEST_F(RemoteTest, RmiIsAStubAndASkeleton) {
-  const std::string tail = Tail(Declared("ipc rmi"));
+  const std::string tail = TranslateHeader(Declared("ipc rmi")).tail;
   EXPECT_EQ(Section(tail, "Result_back", "\n"), "(vesk::InputArchive& _ar, void** _p)");
   EXPECT_EQ(Section(tail, "struct SkeletonJ", "    void Thunk1()"), R"( : vesk::Skeleton
 {
@@ -173,26 +173,24 @@ TEST_F(RemoteTest, RmiIsAStubAndASkeleton) {
   EXPECT_EQ(Section(tail, "struct SkeletonJFactory : public ", "\n    ~"),
             "vesk::ISkeletonFactory\n{\n    SkeletonJFactory()\n    {\n"
             "        vesk::RegisterSkeleton(vesk::GetIpcInterfaceName<J>(),this);\n    }");
-  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t0.cpp"),
+  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
             (std::vector<std::string>{"n::J", "n::StubJ", "n::SkeletonJ"}));
 }
 
 // A remote interface needs its stubs also where it has no record.
 TEST_F(RemoteTest, WithoutReflection) {
   const std::string declarations = "$interface rmi J { };\n";
-  const std::string header = Header(declarations);
+  const std::string header = TranslateHeader(declarations).header;
   EXPECT_EQ(Section(header, "struct JDelegatorMixin : public BC\n", "\n\nnamespace"),
             "{\n};\n\ninline vesk::ConstStringZ _GetIpcInterfaceName(J const*) { return \"J\"; }");
   EXPECT_EQ(Section(header, "InterfaceTypeTraits<J>\n", "} // namespace vesk"),
             "{\n    static const bool is_ipc = true;\n    static const bool is_rmi = true;\n};\n");
-  EXPECT_EQ(Section(Tail(declarations), "", "    StubJ() : Stub(vesk::ptr<J>(this),0) {}\n"),
+  EXPECT_EQ(Section(TranslateHeader(declarations).tail, "", "    StubJ() : Stub(vesk::ptr<J>(this),0) {}\n"),
             "\n//### Registration of stub/scion of $interface J\nstruct StubJ : vesk::Stub\n{\n");
 }
 
 TEST_F(RemoteTest, Faults) {
-  const struct {
-    const char *member, *fault;
-  } kFaults[] = {
+  std::vector<MessageCase> cases = {
       {"void f(int32 a);", "[in] or [out] expected when read int32"},
       {"void f([by] int32 a);", "in,out,inout or copy expected when read by"},
       {"void f([in int32 a);", "Expected ] after in when read int32"},
@@ -208,9 +206,11 @@ TEST_F(RemoteTest, Faults) {
       {"int32 f();", "Return type vesk::int32 invalid - must be void"},
       {"int32 a;", "Attributes currently not supported on IPC interfaces"},
   };
-  for (const auto& [member, fault] : kFaults) {
-    EXPECT_EQ(FaultOf("$interface ipc I {\n" + std::string(member) + " };"), "2: " + std::string(fault)) << member;
+  for (auto& [member, message] : cases) {
+    member = "$interface ipc I {\n" + member + " };";
+    message = "(2) : error : " + message;
   }
+  AssertErrors(cases);
 }
 
 }  // namespace
