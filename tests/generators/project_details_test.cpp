@@ -1,0 +1,182 @@
+// Conditions that the workspace of project_files_test.cpp does not meet, and what goes to the trace log.
+
+#include "generators/generate_fixture.h"
+
+namespace qrex {
+
+namespace {
+
+class ProjectDetailsTest : public GenerateTest {
+ protected:
+  void LoadAndGenerate(CompilerKind compiler, const std::string& project = "app/src/app.qrpj") {
+    settings.compiler = compiler;
+    Load(project);
+    trace.clear();
+    Generate();
+  }
+  static void AssertHolds(const std::string& path, const std::string& text) {
+    std::string content;
+    ASSERT_TRUE(LoadText(content, path, true)) << path;
+    EXPECT_NE(content.find(text), std::string::npos) << path << " lacks:\n" << text << "\nIt is:\n" << content;
+  }
+  static void AssertLacks(const std::string& path, const std::string& text) {
+    std::string content;
+    ASSERT_TRUE(LoadText(content, path, true)) << path;
+    EXPECT_EQ(content.find(text), std::string::npos) << path << " holds:\n" << text << "\nIt is:\n" << content;
+  }
+};
+
+// `old` is loaded, but the project in it goes by another name.
+TEST_F(ProjectDetailsTest, MissingDependency) {
+  const std::string missing = "Error : Can't find dependent project old under project app\n";
+  const std::string noLibrary = "Error : Can't find subproject old/src/old.qrpj under project app\n";
+  AddProject("app", "Application", "subproj { \"old\" } { }");
+  AddFile("tree/old/src/old.qrpj", "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"new\" { }");
+
+  LoadAndGenerate(CompilerKind::vc6);
+  EXPECT_EQ(trace, "Writing app.dsp\nWriting new.dsp\n" + missing + "Writing all.dsw\n");
+  AssertLacks("all.dsw", "Project Dependency");
+
+  LoadAndGenerate(CompilerKind::vc8);
+  EXPECT_EQ(trace, noLibrary + noLibrary + "Writing app.vcproj\nWriting new.vcproj\n" + missing + "Writing all.sln\n");
+  AssertHolds("all.sln", "\tProjectSection(ProjectDependencies) = postProject\n\tEndProjectSection\nEndProject\n");
+
+  LoadAndGenerate(CompilerKind::vc10);
+  EXPECT_EQ(trace, noLibrary + noLibrary + missing +
+                       "Writing app.vcxproj\nWriting app.vcxproj.filters\nWriting new.vcxproj\n"
+                       "Writing new.vcxproj.filters\nWriting all.sln\n");
+  AssertHolds("app.vcxproj", "  <ItemGroup>\n  </ItemGroup>\n  <ItemGroup>\n  </ItemGroup>\n  <Import");
+
+  LoadAndGenerate(CompilerKind::gcc);
+  EXPECT_TRUE(trace.ends_with("Writing all.make\n" + missing + "Writing all.workspace\nWriting all.geany\n")) << trace;
+  AssertHolds("app.cbp", "\t\t\t\t\t<Add option=\"-lold\" />\n");
+}
+
+TEST_F(ProjectDetailsTest, PrepackagedProjectsInSolutions) {
+  AddProject("app", "Application", "subproj { \"pre\" } { }");
+  AddFile("tree/pre/src/pre.qrpj",
+          "$TARGET_TYPE = \"Library\" $ROOT_TO_PROJDIR = \"pre\" export config { \"Debug|x64\" \"Odd|x64\" } { }");
+  settings.solutionContainsPrepackagedProjects = false;
+  LoadAndGenerate(CompilerKind::vc9);
+  const std::string app = "{22222222-2222-2222-2222-222222222222}";
+  AssertHolds("all.sln",
+              "# Visual Studio 2008\n"
+              "Project(\"{8BC9CEB8-8B4A-11D0-8D11-00A0C91BC942}\") = \"app\", \"app.vcproj\", \"" +
+                  app +
+                  "\"\n"
+                  "\tProjectSection(ProjectDependencies) = postProject\n"
+                  "\tEndProjectSection\n"
+                  "EndProject\n"
+                  "Global\n"
+                  "\tGlobalSection(SolutionConfigurationPlatforms) = preSolution\n"
+                  "\t\tDebug|x64 = Debug|x64\n"
+                  "\t\tOdd|x64 = Odd|x64\n"
+                  "\t\tRelease|x64 = Release|x64\n"
+                  "\tEndGlobalSection\n"
+                  "\tGlobalSection(ProjectConfigurationPlatforms) = postSolution\n"
+                  "\t\t" +
+                  app +
+                  ".Debug|x64.ActiveCfg = Debug|x64\n"
+                  "\t\t" +
+                  app +
+                  ".Debug|x64.Build.0 = Debug|x64\n"
+                  "\t\t" +
+                  app +
+                  ".Release|x64.ActiveCfg = Release|x64\n"
+                  "\t\t" +
+                  app +
+                  ".Release|x64.Build.0 = Release|x64\n"
+                  "\tEndGlobalSection\n");
+}
+
+TEST_F(ProjectDetailsTest, OptionsOfTheNewFormat) {
+  AddProject("app", "Console Application", R"qrpj(qrex
+    general { CharacterSet = "3" UseOfATL = "2" UseOfMFC = "-1" ManagedExtensions = "x" WholeProgramOptimization = "4" }
+    +cpp ("Debug") { /Fp "a.pch" /FI "b.h" /FI "c.h" /C /arch:AVX /Fr /fp:except - /clr:pure /wd 4100 /Fe "e" }
+    +rc ("Debug") { /fo "a.res" /x }
+    +link ("Debug") { /HEAP:1,2 /OPT:WIN98 /MANIFEST }
+    { "src" { "a.cpp" : +cpp { /YX } "b.cpp" : +cpp ("Release") { /Yc } } })qrpj");
+  settings.platform = "x64";
+  settings.config = "Debug";
+  LoadAndGenerate(CompilerKind::vc12);
+  const std::string general =
+      "CharacterSet index = 3 out of range\nUseOfMFC index = -1 out of range\n"
+      "ManagedExtensions index = x out of range\n";
+  const std::string messages = general + general +
+                               "todo : resource switch IgnoreStandardIncludePath = true\n"
+                               "todo : resource switch ResourceOutputFileName = a.res\n"
+                               "todo : linker switch HeapCommitSize = 2\n"
+                               "todo : linker switch HeapReserveSize = 1\n"
+                               "VS2012 has no mapping for linker switch OptimizeForWindows98 = 2\n";
+  EXPECT_EQ(trace, messages + "Writing app.vcxproj\nWriting app.vcxproj.filters\n" + messages +
+                       "Writing build_app.vcxproj\nWriting build_app.vcxproj.filters\nWriting all.sln\n"
+                       "Writing build_all.sln\n");
+  AssertHolds("app.vcxproj",
+              "    <PlatformToolset>v120</PlatformToolset>\n    <UseOfAtl>Dynamic</UseOfAtl>\n"
+              "    <WholeProgramOptimization>PGUpdate</WholeProgramOptimization>\n  </PropertyGroup>\n");
+  AssertHolds("app.vcxproj", "    <GenerateManifest>true</GenerateManifest>\n  </PropertyGroup>\n");
+  AssertHolds("app.vcxproj",
+              "    <ClCompile>\n"
+              "      <EnableEnhancedInstructionSet>AdvancedVectorExtensions</EnableEnhancedInstructionSet>\n"
+              "      <FloatingPointExceptions>false</FloatingPointExceptions>\n"
+              "      <ForcedIncludeFiles>b.h;c.h;%(ForcedIncludeFiles)</ForcedIncludeFiles>\n"
+              "      <PreprocessKeepComments>true</PreprocessKeepComments>\n"
+              "      <PrecompiledHeaderOutputFile>a.pch</PrecompiledHeaderOutputFile>\n"
+              "      <PrecompiledHeaderFile>StdAfx.h</PrecompiledHeaderFile>\n"
+              "    </ClCompile>\n");
+  // A value of 0 in the first record asks for nothing; the first record counts for all configurations.
+  AssertHolds("build_app.vcxproj",
+              "    <ClCompile Include=\"qrexsource/x64/Debug/app/src/a.cpp\">\n    </ClCompile>\n"
+              "    <ClCompile Include=\"qrexsource/x64/Debug/app/src/b.cpp\">\n"
+              "      <PrecompiledHeaderFile Condition=\"'$(Configuration)|$(Platform)'=='Debug|x64'\">StdAfx.h"
+              "</PrecompiledHeaderFile>\n");
+}
+
+TEST_F(ProjectDetailsTest, IncludesOfAllRoots) {
+  AddProject("app", "Application",
+             R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj");
+  settings.virtualTree = {"tree", "other"};
+  LoadAndGenerate(CompilerKind::vc8);
+  AssertHolds("app.vcproj", "AdditionalIncludeDirectories=\"tree/app;tree/app/src;a;tree;other;tree/b;other/b\"\n");
+  LoadAndGenerate(CompilerKind::vc14);
+  AssertHolds("app.vcxproj",
+              ">tree/app;tree/app/src;a;tree;other;tree/b;other/b;%(AdditionalIncludeDirectories)</Additional");
+}
+
+TEST_F(ProjectDetailsTest, DebugByNameInVc6) {
+  AddProject("app", "Console Application", "config { \"Win64 Debug|x64\" } { }");
+  LoadAndGenerate(CompilerKind::vc6);
+  AssertHolds("app.dsp", "# TARGTYPE \"Win32 (x86) Console Application\" 0x0103\n");
+  AssertHolds("app.dsp",
+              "!ELSEIF  \"$(CFG)\" == \"app - Win32 Win64 Debug\"\n\n# PROP BASE Use_MFC 0\n"
+              "# PROP BASE Use_Debug_Libraries 1\n");
+}
+
+TEST_F(ProjectDetailsTest, GccWorkspaces) {
+  settings.compiler = CompilerKind::gcc;
+  Workspace empty(settings);
+  empty.name = "all";
+  GenerateWorkspaceFile(empty, false);
+  EXPECT_EQ(trace, "");
+  EXPECT_TRUE(std::filesystem::is_empty("."));
+
+  // No program: no project is active. The first project has headers only.
+  AddProject("base", "Library", "{ \"base.h\" }");
+  AddProject("app", "Dynamic-Link Library", "subproj { \"base\" } { \"app.cpp\" }");
+  LoadAndGenerate(CompilerKind::gcc);
+  AssertHolds("all.workspace",
+              "\t\t<Project filename=\"base.cbp\">\n\t\t</Project>\n"
+              "\t\t<Project filename=\"app.cbp\">\n\t\t\t<Depends filename=\"base.cbp\" />\n\t\t</Project>\n");
+  AssertHolds("all.geany", "[files]\ncurrent_page=0\n\n[build-menu]\n");
+
+  AddProject("tool", "Console Application", "subproj { \"app\" } { }");
+  LoadAndGenerate(CompilerKind::clang, "tool/src/tool.qrpj");
+  AssertHolds("all.workspace", "\t\t<Project filename=\"tool.cbp\" active=\"1\">\n");
+  AssertHolds("tool.cbp",
+              "\t\t\t\t<Option object_output=\"x64/Debug/tool/\" />\n\t\t\t\t<Option type=\"1\" />\n"
+              "\t\t\t\t<Option compiler=\"gcc\" />\n\t\t\t\t<Compiler>\n\t\t\t\t</Compiler>\n");
+}
+
+}  // namespace
+
+}  // namespace qrex
