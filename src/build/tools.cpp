@@ -20,7 +20,7 @@ std::vector<std::string> IncludePaths(const Project& project, const ProjectConfi
 }
 
 std::string CompiledPath(const Project& project, const ProjectConfig& config, const ProjectFile& file) {
-  return project.usesQrex ? PathJoin(TranslationDirectory(config), file.path) : project.SourcePath(file);
+  return (project.usesQrex ? TranslationDirectory(config) : project.rootDir) + "/" + file.path;
 }
 
 std::string_view GccTargetExtension(TargetType type) {

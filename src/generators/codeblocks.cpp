@@ -62,6 +62,23 @@ bool IsUnit(const ProjectFile& file) {
   return file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::H;
 }
 
+// One list for all targets: that of the first configuration. Without one there are no translated files.
+void WriteSources(TextWriter& out, const Project& project) {
+  static const ProjectConfig kNoConfig;
+  const ProjectConfig& config = project.configs.empty() ? kNoConfig : *project.configs.front();
+  const bool isTranslated = project.usesQrex && !project.configs.empty();
+  out << "\t\t<Compiler>\n";
+  for (const std::string& path : IncludePaths(project, config, isTranslated)) {
+    out << "\t\t\t<Add option=\"-I" << path << "\" />\n";
+  }
+  out << "\t\t</Compiler>\n";
+  for (const ProjectFile* file : project.files) {
+    if (!IsUnit(*file)) continue;
+    const std::string path = isTranslated ? CompiledPath(project, config, *file) : project.rootDir + "/" + file->path;
+    out << "\t\t<Unit filename=\"" << path << "\" />\n";
+  }
+}
+
 }  // namespace
 
 void WriteCodeBlocksProject(TextWriter& out, const Project& project) {
@@ -74,18 +91,8 @@ void WriteCodeBlocksProject(TextWriter& out, const Project& project) {
          "\t\t<Option compiler=\"gcc\" />\n"
          "\t\t<Build>\n";
   for (const auto& config : project.configs) WriteTarget(out, project, *config);
-  out << "\t\t</Build>\n"
-         "\t\t<Compiler>\n";
-  // One list for all targets: that of the first configuration.
-  static const ProjectConfig kNoConfig;
-  const ProjectConfig& first = project.configs.empty() ? kNoConfig : *project.configs.front();
-  for (const std::string& path : IncludePaths(project, first, project.usesQrex)) {
-    out << "\t\t\t<Add option=\"-I" << path << "\" />\n";
-  }
-  out << "\t\t</Compiler>\n";
-  for (const ProjectFile* file : project.files) {
-    if (IsUnit(*file)) out << "\t\t<Unit filename=\"" << CompiledPath(project, first, *file) << "\" />\n";
-  }
+  out << "\t\t</Build>\n";
+  WriteSources(out, project);
   out << "\t\t<Extensions>\n"
          "\t\t\t<code_completion>\n"
       << "\t\t\t\t<search_path add=\"" << PathJoin(project.rootDir, project.rootToProjDir) << "\" />\n"

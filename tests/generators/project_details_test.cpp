@@ -169,6 +169,15 @@ TEST_F(ProjectDetailsTest, GccWorkspaces) {
               "\t\t<Project filename=\"app.cbp\">\n\t\t\t<Depends filename=\"base.cbp\" />\n\t\t</Project>\n");
   AssertHolds("all.geany", "[files]\ncurrent_page=0\n\n[build-menu]\n");
 
+  // Without a configuration nothing is translated. A root may be the current folder.
+  AddFile("bare/src/bare.qrpj", "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"bare\" qrex { \"bare.c\" }");
+  settings.virtualTree = {"tree", "."};
+  LoadAndGenerate(CompilerKind::gcc, "bare/src/bare.qrpj");
+  AssertHolds("bare.cbp",
+              "\t\t<Build>\n\t\t</Build>\n\t\t<Compiler>\n\t\t\t<Add option=\"-Ibare\" />\n"
+              "\t\t\t<Add option=\"-Ibare/src\" />\n\t\t\t<Add option=\"-Itree\" />\n\t\t\t<Add option=\"-I.\" />\n"
+              "\t\t</Compiler>\n\t\t<Unit filename=\"./bare/bare.c\" />\n");
+
   AddProject("tool", "Console Application", "subproj { \"app\" } { }");
   LoadAndGenerate(CompilerKind::clang, "tool/src/tool.qrpj");
   AssertHolds("all.workspace", "\t\t<Project filename=\"tool.cbp\" active=\"1\">\n");
