@@ -6,8 +6,6 @@ namespace {
 
 using MixinsTest = TranslateTest;
 
-constexpr char kTypeOps[] = "            {\n                sizeof";  // the last piece of a class record begins so
-
 constexpr char kListOfEverySort[] = R"($mixin M << reflect >>
 {
     $int32 a;
@@ -98,44 +96,10 @@ vesk::TypeOps const& _GetTypeOps(K const*);
 // What a mixin reflects stands in the record of the class; the model of an entry is reached through its _model_.
 TEST_F(MixinsTest, RecordOfAClassWithMixins) {
   const std::string tail = TranslateHeader(kListOfEverySort).tail;
-  EXPECT_EQ(Section(tail, "vesk::ReflectedClass const& _GetReflected(K const*)\n", kTypeOps),
-            R"(    {
-        static const vesk::octet_t K_a[] =
-        {
-            0x04
-        };
-        static const vesk::ReflectedField K_fields[] =
-        {
-            { "a", offsetof(K,a), K_a },
-        };
-        static const vesk::octet_t K_y[] =
-        {
-            0x01
-        };
-        static const vesk::octet_t K_z[] =
-        {
-            0x02
-        };
-        static const vesk::ReflectedModelField K_modelFields[] =
-        {
-            { "y", offsetof(K,_model_.y), K_y, 0, -1 },
-            { "z", offsetof(K,_model_.z), K_z, 0, -1 },
-        };
-        static const vesk::ReflectedClass K_class =
-        {
-            1,
-            "K",
-            sizeof(K),
-            0,
-            K_fields,1,
-            K_modelFields,2,
-            0,0,
-            0,0,
-            0,
-            0,0,0,
-            0,
-            0,
-)");
+  EXPECT_EQ(Section(tail, "K_fields[] =\n", "        };"), "        {\n            { \"a\", offsetof(K,a), K_a },\n");
+  EXPECT_EQ(Section(tail, "K_modelFields[] =\n", "        };"),
+            "        {\n            { \"y\", offsetof(K,_model_.y), K_y, 0, -1 },\n"
+            "            { \"z\", offsetof(K,_model_.z), K_z, 0, -1 },\n");
 }
 
 TEST_F(MixinsTest, BasesAroundAList) {
@@ -174,7 +138,7 @@ template<> struct TypeTraits<A>
     static const bool has_metadata = 1;
 };
 )");
-  EXPECT_EQ(Section(Translate("a.cpp", R"(@import "t.h"
+  const std::string source = Translate("a.cpp", R"(@import "t.h"
 $adt+ implement A
 {
     int n;
@@ -182,9 +146,8 @@ $adt+ implement A
     $implementing adt A { set };
 };
 int behind;
-)"),
-                    "#include \"t.h\"\n", kTypeOps),
-            R"(struct A
+)");
+  EXPECT_EQ(Section(source, "#include \"t.h\"\n", "namespace vesk"), R"(struct A
 {
     int n;
     int get(int i) const { return n + i; }
@@ -201,31 +164,9 @@ inline void __stdcall set(A* _self,vesk::string8 const& s) { _self->set(s); }
 int behind;
 
 //### $adt+ A
-namespace vesk { XTarget* app_GetXTarget(); }
-    vesk::ReflectedClass const& _GetReflected(A const*)
-    {
-        static const vesk::octet_t A_get_return[] =
-        {
-            0x04
-        };
-        static const vesk::octet_t A_get_i[] =
-        {
-            0x04
-        };
-        static const vesk::ReflectedArg A_get_args[] =
-        {
-            { "i", A_get_i },
-        };
-        static const vesk::octet_t A_set_s[] =
-        {
-            0x36,0x31,0x10
-        };
-        static const vesk::ReflectedArg A_set_args[] =
-        {
-            { "s", A_set_s },
-        };
-        static const vesk::ReflectedClassMethod A_methods[] =
-        {
+)");
+  EXPECT_EQ(Section(source, "ReflectedClassMethod A_methods[] =\n", "            sizeof(A)"),
+            R"(        {
             {"get",{A_get_return},A_get_args,1,0,true,(vesk::FunctionPointer)(vesk::int32 (__stdcall *)(A const* _self,vesk::int32 i))&::get},
             {"set",{0},A_set_args,1,0,false,(vesk::FunctionPointer)(void (__stdcall *)(A* _self,vesk::string8 const& s))&::set},
         };
@@ -233,16 +174,6 @@ namespace vesk { XTarget* app_GetXTarget(); }
         {
             16,
             "A",
-            sizeof(A),
-            0,
-            0,0,
-            0,0,
-            0,0,
-            A_methods,2,
-            0,
-            0,0,0,
-            0,
-            0,
 )");
 }
 
