@@ -1,6 +1,5 @@
 #include "translator/functor_def.h"
 
-#include "lex/sections.h"
 #include "translator/byte_code.h"
 #include "translator/emit.h"
 #include "translator/records.h"
@@ -132,19 +131,10 @@ class MakeFunctor {
 
  private:
   void ReadBinding() {
-    TextRange object, base;
-    LexScanner scanner = m_parser.scanner;
-    const LexToken comma = ReadArgument(scanner, object, kCloseParen);
-    m_parser.scanner = scanner;
-    m_parser.current = comma;
-    if (comma.kind != kComma) m_parser.FailExpected(",");
-    const LexToken close = ReadArgument(scanner, base, kCloseParen);
-    m_parser.scanner = scanner;
-    m_parser.current = close;
-    if (close.kind != kCloseParen) m_parser.FailExpected(")");
-    m_object = object.Text();
-    m_base = base.Text();
-    m_parser.Advance();
+    m_object = m_parser.ReadArgumentText();
+    if (!m_parser.Is(kComma)) m_parser.FailExpected(",");
+    m_base = m_parser.ReadArgumentText();
+    m_parser.Expect(kCloseParen, ")");
   }
 
   // The indentation of the body's first line is taken from each of its lines.

@@ -102,6 +102,7 @@ class QrexParser : public ExpressionParser {
   void ParseMethodOrAttribute(bool constAllowed, bool& isAttribute, FunctionSignature& signature, bool ipc,
                               bool reflected);
   void ParseFunctionArg(FunctionArg& arg, bool directionsRequired, bool reflected);
+  std::string ReadArgumentText();            // behind the current token, to the top-level `,` or `)` that ends it
   void ParseMetadataList(std::string& out);  // `[` is current; behind `]` afterwards
   void ParseMetadataValue(std::string& out);
   void ParseOptionalMetadata(std::string& out);  // tests for `[`

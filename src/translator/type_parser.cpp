@@ -298,6 +298,13 @@ void QrexParser::ParseFunctionArg(FunctionArg& arg, bool directionsRequired, boo
   CheckDirection(arg, position);
 }
 
+std::string QrexParser::ReadArgumentText() {
+  TextRange argument;
+  previous = current;
+  current = ReadArgument(scanner, argument, kCloseParen);
+  return argument.Text();
+}
+
 // From behind the `(` to behind the `)`.
 void QrexParser::ParseArguments(FunctionSignature& signature, bool directionsRequired, bool polymorphicAllowed,
                                 bool reflected) {
@@ -310,15 +317,7 @@ void QrexParser::ParseArguments(FunctionSignature& signature, bool directionsReq
     }
     ParseFunctionArg(arg, directionsRequired, reflected);
     if (arg.polymorphic) Expect(kCloseBracket, "]");
-    if (Is(kAssign)) {
-      LexScanner ahead = scanner;
-      TextRange value;
-      const LexToken end = ReadArgument(ahead, value, kCloseParen);
-      arg.defaultValue = value.Text();
-      previous = current;
-      current = end;
-      scanner = ahead;
-    }
+    if (Is(kAssign)) arg.defaultValue = ReadArgumentText();
     if (Is(kCloseParen)) break;
     if (!Accept(kComma)) Fail(", or ) expected in argument list when read " + Printed(current));
   }

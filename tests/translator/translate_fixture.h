@@ -176,6 +176,16 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     return text.substr(start, end.empty() ? end.npos : text.find(end, start) - start);
   }
 
+  // The TypeTraits block of an element of the root name space. `flags`: exported, reflected, registered, metadata.
+  static std::string TraitsText(const std::string& name, const std::string& kind, const char (&flags)[5]) {
+    static constexpr std::string_view kLines[] = {"is_exported", "is_reflected", "is_registered"};
+    std::string text = "\nnamespace vesk\n{\ntemplate<> struct TypeTraits<" + name + ">\n{\n";
+    for (size_t i = 0; i < 3; ++i) text += "    static const bool " + std::string(kLines[i]) + " = " + flags[i] + ";\n";
+    text += "    static const vesk::ETypeTraitKind kind = vesk::TTK_" + kind + ";\n";
+    text += std::string("    static const bool has_metadata = ") + flags[3] + ";\n";
+    return text + "};\n} // namespace vesk\n";
+  }
+
   // The printed form of the error that the translation of `text` raises.
   std::string ErrorOf(const std::string& name, const std::string& text) {
     try {

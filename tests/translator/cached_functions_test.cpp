@@ -1,0 +1,273 @@
+// $cache: functions whose results are kept in nodes, one per function or one per key.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class CachedFunctionsTest : public TranslateTest {
+ protected:
+  // What comes of the body of a class.
+  std::string Body(const std::string& body, const std::string& head = "$struct S") {
+    const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
+    const size_t begin = header.find("//\n") + 3;
+    return header.substr(begin, header.find("int end;\n") - begin);
+  }
+  // From the node on.
+  std::string Node(const std::string& body, const std::string& head = "$struct S") {
+    const std::string text = Body(body, head);
+    const size_t begin = text.find("struct _depnode_");
+    return begin == std::string::npos ? text : text.substr(begin);
+  }
+};
+
+TEST_F(CachedFunctionsTest, Plain) {
+  EXPECT_EQ(R"~(inline vesk::int32 _calc_f() const
+{
+    return 1; 
+}
+
+struct _depnode_f : public vesk::DGSyncDepNode<_depnode_f,S,vesk::int32>
+{
+    typedef vesk::DGSyncDepNode<_depnode_f,S,vesk::int32> base;
+    using typename base::output_type;
+    virtual bool RecalcCache() const
+    {
+        vesk::int32 _prev = _output;
+        _output = _GetSelf()->_calc_f();
+        if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();
+        return _prev != _output;
+    }
+    S const* _GetSelf() const { return CONST_ATTRIB_CAST(S,_dn_f); }
+    S const* _GetFinalSelf() const { return _GetSelf(); }
+    virtual vesk::xstring Name() const { return "S::f()"; }
+    virtual vesk::ssize_t EvictionQueueIndex() const { return 3; }
+} _dn_f;
+inline vesk::int32 const& f() const
+{
+    return _dn_f.read();
+}
+)~",
+            Body("$cache <<queue(1 + 2) visit>> inline int32 f() const\n{\n    return 1; \n}\n"));
+}
+
+TEST_F(CachedFunctionsTest, HardByReferenceInMixin) {
+  EXPECT_EQ(R"~(void _calc_f(vesk::xvector<vesk::int32>& out) const
+{ }
+
+struct _depnode_f : public vesk::DGSyncDepNode<_depnode_f,M,vesk::xvector<vesk::int32>>
+{
+    typedef vesk::DGSyncDepNode<_depnode_f,M,vesk::xvector<vesk::int32>> base;
+    using typename base::output_type;
+    _depnode_f() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }
+    virtual bool RecalcCache() const
+    {
+        _GetSelf()->_calc_f(_output);
+        if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();
+        return true;
+    }
+    M const* _GetSelf() const { return CONST_ATTRIB_CAST(M,_dn_f); }
+    const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename BC::FinalClass*>(_GetSelf()); }
+    virtual vesk::xstring Name() const { return "M::f()"; }
+} _dn_f;
+vesk::xvector<vesk::int32> const& f() const
+{
+    return _dn_f.read();
+}
+)~",
+            Body("$cache - ^ void f(xvector<int32>& out) const { }\n", "$mixin M"));
+}
+
+TEST_F(CachedFunctionsTest, AsyncWithInput) {
+  EXPECT_EQ(R"~(void _calc_f_input(vesk::string8& in) const
+{
+    in = name();
+}
+vesk::int32 _calc_f(vesk::string8 in) const
+{ return size(in); }
+
+struct _depnode_f : public vesk::DGAsyncNodeOnInput<_depnode_f,S,vesk::string8,vesk::int32>
+{
+    typedef vesk::DGAsyncNodeOnInput<_depnode_f,S,vesk::string8,vesk::int32> base;
+    using typename base::output_type;
+    using typename base::input_type;
+    _depnode_f() { SetFlag(vesk::DF_ASYNC_IO); }
+    static void CalcOutput(const S* _self, output_type& _output, const input_type& _input)
+    {
+        _output = _self->_calc_f(_input);
+    }
+    static void CalcInput(const S* _self, input_type& _input)
+    {
+        _self->_calc_f_input(_input);
+    }
+    S const* _GetSelf() const { return CONST_ATTRIB_CAST(S,_dn_f); }
+    S const* _GetFinalSelf() const { return _GetSelf(); }
+    virtual vesk::xstring Name() const { return "S::f()"; }
+} _dn_f;
+vesk::int32 const& f() const
+{
+    return _dn_f.read();
+}
+)~",
+            Body("$cache <<async io>> int32 f() const with string8 in = name(); { return size(in); }\n"));
+}
+
+TEST_F(CachedFunctionsTest, AsyncWithoutInput) {
+  EXPECT_EQ(R"~(struct _depnode_f : public vesk::DGAsyncIndepNode<_depnode_f,S,vesk::int32>
+{
+    typedef vesk::DGAsyncIndepNode<_depnode_f,S,vesk::int32> base;
+    using typename base::output_type;
+    static void CalcOutput(const S* _self, output_type& _output)
+    {
+        _self->_calc_f(_output);
+    }
+    S const* _GetSelf() const { return CONST_ATTRIB_CAST(S,_dn_f); }
+    S const* _GetFinalSelf() const { return _GetSelf(); }
+    virtual vesk::xstring Name() const { return "S::f()"; }
+} _dn_f;
+vesk::int32 const& f() const
+{
+    return _dn_f.read();
+}
+)~",
+            Node("$cache ^ <<io async -io>> void f(int32& n) const { }\n"));
+}
+
+TEST_F(CachedFunctionsTest, KeyedByOne) {
+  EXPECT_EQ(R"~(struct _depnode_f : public vesk::DGKeyedSyncDepNode<_depnode_f,M,vesk::string8,vesk::int32>
+{
+    typedef vesk::DGKeyedSyncDepNode<_depnode_f,M,vesk::string8,vesk::int32> base;
+    using typename base::key_type;
+    using typename base::output_type;
+    using typename base::map_type;
+    virtual bool RecalcCache() const
+    {
+        auto _prev = _output;
+        _output = _self->_calc_f(_GetKey());
+        if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();
+        return _prev != _output;
+    }
+    virtual vesk::xstring Name() const
+    {
+        return vxMakeString("M::f(" << _GetKey() << ')');
+    }
+    map_type& _GetMap() const { return _self->_map_f; }
+    const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename BC::FinalClass*>(_self); }
+};
+mutable typename _depnode_f::map_type _map_f;
+vesk::int32 const& f(vesk::string8 const& k="") const
+{
+    return _map_f[k].read(this);
+}
+)~",
+            Node("$cache int32 f(string8 const& k = \"\") const { }\n", "$mixin M"));
+}
+
+TEST_F(CachedFunctionsTest, KeyedBySeveralByReference) {
+  EXPECT_EQ(
+      R"~(void _calc_f(bool& out,vesk::int32 a,vesk::string8 const& b,vesk::float64 c) const
+{ }
+
+struct _depnode_f : public vesk::DGKeyedSyncDepNode<_depnode_f,S,std::pair<vesk::int32,std::pair<vesk::string8,vesk::float64>>,bool>
+{
+    typedef vesk::DGKeyedSyncDepNode<_depnode_f,S,std::pair<vesk::int32,std::pair<vesk::string8,vesk::float64>>,bool> base;
+    using typename base::key_type;
+    using typename base::output_type;
+    using typename base::map_type;
+    _depnode_f() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }
+    virtual bool RecalcCache() const
+    {
+        std::pair<vesk::int32,std::pair<vesk::string8,vesk::float64>> const& _key = _GetKey();
+        _self->_calc_f(_output,_key.first,_key.second.first,_key.second.second);
+        if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();
+        return true;
+    }
+    virtual vesk::xstring Name() const
+    {
+        std::pair<vesk::int32,std::pair<vesk::string8,vesk::float64>> const& _key = _GetKey();
+        return vxMakeString("S::f(" << _key.first << ',' << _key.second.first << ',' << _key.second.second << ')');
+    }
+    virtual vesk::ssize_t EvictionQueueIndex() const { return 7; }
+    map_type& _GetMap() const { return _self->_map_f; }
+    S const* _GetFinalSelf() const { return _self; }
+};
+mutable typename _depnode_f::map_type _map_f;
+bool const& f(vesk::int32 a,vesk::string8 const& b,vesk::float64 c) const
+{
+    return _map_f[std::make_pair(a,std::make_pair(b,c))].read(this);
+}
+)~",
+      Body("$cache ^ <<queue(7)>> void f(bool& out, int32 a, string8 const& b, float64 c) const { }\n"));
+}
+
+TEST_F(CachedFunctionsTest, KeyedAsyncWithInput) {
+  EXPECT_EQ(R"~(void _calc_f_input(vesk::string8& in,vesk::int32 a,bool b) const
+
+{ in = name(a, b); } 
+
+vesk::int32 _calc_f(vesk::int32 a,bool b,vesk::string8 in) const
+{ return size(in); }
+
+struct _depnode_f : public vesk::DGKeyedAsyncNodeOnInput<_depnode_f,S,std::pair<vesk::int32,bool>,vesk::string8,vesk::int32>
+{
+    typedef vesk::DGKeyedAsyncNodeOnInput<_depnode_f,S,std::pair<vesk::int32,bool>,vesk::string8,vesk::int32> base;
+    using typename base::key_type;
+    using typename base::output_type;
+    using typename base::map_type;
+    using typename base::input_type;
+    _depnode_f() { SetFlag(vesk::DF_ASYNC_IO); }
+    static void CalcOutput(const S* _self, output_type& _output, const key_type& _key, const input_type& _input)
+    {
+        _output = _self->_calc_f(_key.first,_key.second,_input);
+    }
+    static void CalcInput(const S* _self, input_type& _input, const key_type& _key)
+    {
+        _self->_calc_f_input(_input,_key.first,_key.second);
+    }
+    virtual vesk::xstring Name() const
+    {
+        std::pair<vesk::int32,bool> const& _key = _GetKey();
+        return vxMakeString("S::f(" << _key.first << ',' << _key.second << ')');
+    }
+    map_type& _GetMap() const { return _self->_map_f; }
+    S const* _GetFinalSelf() const { return _self; }
+};
+mutable typename _depnode_f::map_type _map_f;
+vesk::int32 const& f(vesk::int32 a,bool b) const
+{
+    return _map_f[std::make_pair(a,b)].read(this);
+}
+)~",
+            Body("$cache <<async io>> int32 f(int32 a, bool b) const with string8 in { in = name(a, b); } "
+                 "{ return size(in); }\n"));
+}
+
+TEST_F(CachedFunctionsTest, Errors) {
+  const auto inClass = [](std::string text) { return "$struct S {\n$cache " + text; };
+  AssertErrors({
+      {inClass("<<fast>> int32 f() const { } };"), "(2) : error : Unrecognised qualifier << fast >> on $cache"},
+      {inClass("<<queue(8)>> int32 f() const { } };"), "(2) : error : Eviction queue index 8 must be between 0 and 7"},
+      {inClass("<<-queue(-1)>> int32 f() const { } };"),
+       "(2) : error : Eviction queue index -1 must be between 0 and 7"},
+      {inClass("<<queue 1>> int32 f() const { } };"), "(2) : error : Expected ( after queue when read 1"},
+      {inClass("int32 f()\n{ } };"), "(3) : error : $cache function must be declared const"},
+      {inClass("void f() const { } };"), "(2) : error : $cache function missing output type"},
+      {inClass("void f(int32 a) const { } };"), "(2) : error : $cache function missing output type"},
+      {inClass("void f(const int32& a) const { } };"), "(2) : error : $cache function missing output type"},
+      {inClass("int32 f() const with int32 i { } { } };"),
+       "(2) : error : 'with' only allowed on async $cache function"},
+      {inClass("<<async>> int32 f() const with int32 { } { } };"), "(2) : error : Error parsing input type and name"},
+      {inClass("<<async>> int32 f() const with int32 i() { } };"), "(2) : error : Error parsing input type and name"},
+      {inClass("<<async>> int32 f() const with 7 { } };"), "(2) : error : Error parsing input type and name"},
+      {inClass("<<async>> int32 f() const with int32 i = 1"),
+       "(2) : error : Met EOS while scanning forwards for semicolon"},
+      {inClass("<<async>> int32 f() const with int32 i = { } { } };"), "(2) : error : Expected ; after } when read {"},
+      {inClass("int32 f() const; };"), "(2) : error : Expected { after const when read ;"},
+      {inClass("int32 f() const { "), "(2) : error : Met EOS before read matching brace"},
+      {inClass("int32 f([int32 a]) const { } };"),
+       "(2) : error : '[' unexpected.  Polymorphic argument not allowed here"},
+  });
+}
+
+}  // namespace
+}  // namespace qrex

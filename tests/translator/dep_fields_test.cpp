@@ -1,0 +1,332 @@
+// $dep and $indep fields, $evict and $visit blocks in class bodies.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class DepFieldsTest : public TranslateTest {
+ protected:
+  // What comes of the body of a class.
+  std::string Body(const std::string& body, const std::string& head = "$struct S") {
+    const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
+    const size_t begin = header.find("//\n") + 3;
+    return header.substr(begin, header.find("int end;\n") - begin);
+  }
+};
+
+TEST_F(DepFieldsTest, DepWithAllSections) {
+  EXPECT_EQ(R"(void a_calc(vesk::string8& a) const
+{ a = name(); } 
+void a_create(vesk::string8& a) const
+{ make(a); } 
+void a_destroy(vesk::string8& a) const
+{ }
+
+void a_visit(vesk::IObjectVisitor& _v) const
+{ _v << S::shared; } 
+bool a_evictable() const
+{ return this->GetThisAsFinalClass()->free(); }
+
+void a_evict() const
+{ vesk::DollarNew(new X(1)); $other; } 
+void a_invalidate() const
+{
+    stale();
+}
+
+mutable vesk::string8 _a_;
+struct Depnode_a : vesk::DGDepNode
+{
+    typedef vesk::string8 value_type;
+    Depnode_a() : vesk::DGDepNode(vesk::DF_SYNC_DEP)
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_create(_self->_a_);
+    }
+    ~Depnode_a()
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_destroy(_self->_a_);
+    }
+    virtual vesk::ssize_t ByteSize() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        return vesk::CacheValueAdditionalSize(_self->_a_);
+    }
+    virtual vesk::xstring Name() const { return "S::a"; }
+    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_visit(_v);
+    }
+    virtual bool RecalcCache() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        auto _prev = _self->_a_;
+        _self->a_calc(_self->_a_);
+        if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();
+        return _prev != _self->_a_;
+    }
+    virtual bool IsEvictable() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        return _self->a_evictable();
+    }
+    virtual void OnEvict() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_evict();
+    }
+    virtual void OnInvalidate() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_invalidate();
+    }
+    value_type const& read() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
+    operator value_type const&() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
+} a;
+vesk::string8 const& Geta() const { a.ReadBarrier(); return _a_; }
+
+)",
+            Body("$dep string8 a calc { a = name(); } create { make(a); } destroy { }\n"
+                 "visit { _v << $$::shared; } evictable { return $this->free(); }\n"
+                 "evict { $new X(1); $other; } invalidate\n{\n    stale();\n}\n;\n"));
+}
+
+TEST_F(DepFieldsTest, HardShortForm) {
+  EXPECT_EQ(R"(void a_calc(vesk::int32& a) const
+{
+    a = b + 1;
+}
+mutable vesk::int32 _a_;
+struct Depnode_a : vesk::DGDepNode
+{
+    typedef vesk::int32 value_type;
+    Depnode_a() : vesk::DGDepNode(vesk::DF_SYNC_DEP|vesk::DF_PROPAGATE_HARD_DIRTINESS) {}
+    virtual vesk::ssize_t ByteSize() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        return vesk::CacheValueAdditionalSize(_self->_a_);
+    }
+    virtual vesk::xstring Name() const { return "S::a"; }
+    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _v << _self->_a_;
+    }
+    virtual bool RecalcCache() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_calc(_self->_a_);
+        if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();
+        return true;
+    }
+    virtual bool IsEvictable() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        return vesk::CacheValueIsEvictable(_self->_a_);
+    }
+    virtual void OnEvict() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        vesk::OnEvictCacheValue(_self->_a_); vesk::ClearCacheValue(_self->_a_);
+    }
+    value_type read() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
+    operator value_type() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
+} a;
+vesk::int32 Geta() const { a.ReadBarrier(); return _a_; }
+
+)",
+            Body("$dep ^ int32 a = b + 1;\n"));
+}
+
+TEST_F(DepFieldsTest, VoidDep) {
+  EXPECT_EQ(R"(void d_calc() const
+{
+    go();
+    done();
+}
+struct Depnode_d : vesk::DGDepNode
+{
+    typedef void value_type;
+    Depnode_d() : vesk::DGDepNode(vesk::DF_SYNC_DEP|vesk::DF_PROPAGATE_HARD_DIRTINESS) {}
+    virtual vesk::ssize_t ByteSize() const
+    {
+        return 0;
+    }
+    virtual vesk::xstring Name() const { return "S::d"; }
+    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
+    {
+    }
+    virtual bool RecalcCache() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,d);
+        _self->d_calc();
+        return true;
+    }
+    virtual bool IsEvictable() const
+    {
+        return true;
+    }
+    void read() const { ReadBarrier(); }
+    void operator()() const { ReadBarrier(); }
+} d;
+
+)",
+            Body("$dep void d = { go();\ndone(); };\n"));
+}
+
+TEST_F(DepFieldsTest, ShortBodies) {
+  const auto bodyOf = [this](const std::string& definition) {
+    const std::string text = Body("$dep int32 a = " + definition + "\n");
+    return text.substr(0, text.find("mutable"));
+  };
+  const std::string head = "void a_calc(vesk::int32& a) const\n";
+  EXPECT_EQ(head + "{\n    a = f(x, y);\n}\n", bodyOf("f(x, y) /* why */ ;"));
+  EXPECT_EQ(head + "{\n    a = vesk::DollarNew(new X(1))->n + S::k;\n}\n", bodyOf("$new X(1)->n + $$::k;"));
+  EXPECT_EQ(head + "{\n    a = this->GetThisAsFinalClass()->b;\n}\n", bodyOf("{ a = $this->b; };"));
+  EXPECT_EQ(head + "{\n    if (x) { a = 1; } // one\n}\n", bodyOf("{ if (x) { a = 1; } // one\n };"));
+}
+
+TEST_F(DepFieldsTest, IndepWithSections) {
+  EXPECT_EQ(R"(void w_create(int*& w) const
+{ } 
+void w_destroy(int*& w) const
+{ } 
+bool w_evictable() const
+{ return false; } 
+void w_evict() const
+{ }
+int* _w_;
+struct Indepnode_w : vesk::DGIndepNode
+{
+    typedef int* value_type;
+    Indepnode_w()
+    {
+        S* _self = ATTRIB_CAST(S,w);
+        _self->w_create(_self->_w_);
+    }
+    ~Indepnode_w()
+    {
+        S* _self = ATTRIB_CAST(S,w);
+        _self->w_destroy(_self->_w_);
+    }
+    virtual vesk::ssize_t ByteSize() const { return 0; }
+    virtual vesk::xstring Name() const { return "S::w"; }
+    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,w);
+        _v << _self->_w_;
+    }
+    virtual bool IsEvictable() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,w);
+        return _self->w_evictable();
+    }
+    virtual void OnEvict() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,w);
+        _self->w_evict();
+    }
+    value_type read() const { ReadBarrier(); return CONST_ATTRIB_CAST(S,w)->_w_; }
+    value_type& write() { OnChange(); return ATTRIB_CAST(S,w)->_w_; }
+    operator value_type() const { return CONST_ATTRIB_CAST(S,w)->Getw(); }
+    void operator=(value_type _v) { write() = _v; }
+} w;
+int* Getw() const { w.ReadBarrier(); return _w_; }
+void Setw(int* _v) { w.OnChange(); _w_ = _v; }
+
+)",
+            Body("$indep int* w create { } destroy { } evictable { return false; } evict { };\n"));
+}
+
+TEST_F(DepFieldsTest, VisitingOfTheContainingObject) {
+  const auto visitOf = [this](const std::string& head, const std::string& field) {
+    const std::string text = Body(field, head);
+    const std::string heading = "VisitContainingObject(vesk::IObjectVisitor& _v) const\n    {\n";
+    const size_t begin = text.find(heading) + heading.size();
+    return text.substr(begin, text.find("    }\n", begin) - begin);
+  };
+  const std::string self = "        S const* _self = CONST_ATTRIB_CAST(S,a);\n";
+  EXPECT_EQ("", visitOf("$struct S", "$indep <<-visit>> int32 a;\n"));
+  EXPECT_EQ(self + "        _v << _self->_a_;\n        _v << static_cast<const typename BC::FinalClass*>(_self);\n",
+            visitOf("$mixin S", "$indep <<visit>> int32 a;\n"));
+  EXPECT_EQ(self + "        _v << static_cast<const typename BC::FinalClass*>(_self);\n",
+            visitOf("$mixin S", "$dep <<-visit>> int32 a = 1;\n"));
+  EXPECT_EQ(self + "        _v << _self;\n", visitOf("$class S isa vesk::IObject", "$dep void a calc { };\n"));
+}
+
+// --- $evict, $visit
+
+TEST_F(DepFieldsTest, BlocksOfClassWithoutRegistration) {
+  EXPECT_EQ(R"(void EvictDgsNodes_extra() const
+{ S::drop(); } 
+
+void VisitObjects(vesk::IObjectVisitor& v) const
+{
+    v << this->GetThisAsFinalClass();
+}
+
+)",
+            Body("$evict { $$::drop(); } $visit { v << $this; }\n"));
+  EXPECT_EQ(
+      "\nvoid VisitObjects(vesk::IObjectVisitor& v) const\n{\n    BaseClass::VisitObjects(v);\n    v << x;\n}\n\n",
+      Body("$visit { v << x; }\n", "$mixin S"));
+}
+
+TEST_F(DepFieldsTest, BlocksOfClassWithRegistration) {
+  const std::string text = "namespace n { $class+ S\n{//\n$evict { drop(); }\n$visit { v << x;\nv << y; }\n}; }\n";
+  const Generated generated = TranslateHeader(text);
+  EXPECT_NE(std::string::npos, generated.header.find("//\nvoid EvictDgsNodes_extra() const;\n\n\n"
+                                                     "void VisitObjects(vesk::IObjectVisitor& v) const;\n\n"))
+      << generated.header;
+  EXPECT_NE(std::string::npos, generated.tail.find(R"(    void n::S::EvictDgsNodes_extra() const
+    {
+        drop();
+    }
+    void n::S::VisitObjects(vesk::IObjectVisitor& v) const
+    {
+        v << x;
+        v << y;
+    }
+    
+    // Registration of $class+ n::S
+)")) << generated.tail;
+}
+
+TEST_F(DepFieldsTest, Errors) {
+  const auto inClass = [](std::string text) { return "$struct S {\n" + text; };
+  AssertErrors({
+      {inClass("$indep ^ int32 a; };"), "(2) : error : ^ not permitted on $indep"},
+      {inClass("$dep <<async>> int32 a = 1; };"), "(2) : error : Unrecognised qualifier << async >> on $cache"},
+      {inClass("$indep 7; };"), "(2) : error : Syntax error"},
+      {inClass("$dep 7; };"), "(2) : error : Type expected when read 7"},
+      {inClass("$dep int32; };"), "(2) : error : Expected identifier after int32 when read ;"},
+      {inClass("$indep void a; };"), "(2) : error : void not permitted on $indep"},
+      {inClass("$int32 a; $dep int32 a = 1; };"), "(2) : error : Redefinition of field a"},
+      {inClass("$model { int32 a; } $indep int32 a; };"), "(2) : error : Redefinition of field a"},
+      {inClass("$dep int32 a\ncalc { } again { } };"),
+       "(3) : error : Expected 'evictable','evict','create','destroy','invalidate','visit' or 'calc' after } when read "
+       "again"},
+      {inClass("$indep int32 a = 1; };"), "(2) : error : Expected 'create','destroy' or 'visit' after a when read ="},
+      {inClass("$indep int32 a calc { } };"), "(2) : error : 'calc' can't be specified on $indep"},
+      {inClass("$indep int32 a invalidate { } };"), "(2) : error : 'invalidate' can't be specified on $indep"},
+      {inClass("$dep int32 a create { }\n; };"), "(3) : error : calc section not specified"},
+      {inClass("$dep int32 a = { } int b; };"), "(2) : error : Expected ; after } when read int"},
+      {inClass("$dep int32 a = 1 }"), "(2) : error : Met EOS while scanning forwards for semicolon"},
+      {inClass("$dep int32 a calc return 1; };"), "(2) : error : Expected { after calc when read return"},
+      {inClass("$dep int32 a calc { {"), "(2) : error : Met EOS before read matching brace"},
+      {inClass("$dep int32 a = { {"), "(2) : error : Met EOS before read matching brace"},
+      {inClass("$evict;"), "(2) : error : Expected { after evict when read ;"},
+      {inClass("$visit;"), "(2) : error : Expected { after visit when read ;"},
+  });
+  for (const char* word : {"calc", "create", "destroy", "visit", "evictable", "evict", "invalidate"}) {
+    const std::string section = std::string(word) + " { } ";
+    AssertErrors({{inClass("$dep int32 a " + section + section + "; };"),
+                   "(2) : error : '" + std::string(word) + "' already specified"}});
+  }
+}
+
+}  // namespace
+}  // namespace qrex

@@ -1,0 +1,240 @@
+// $enum and $enum class: their text, their records, their faults.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class EnumsTest : public TranslateTest {};
+
+TEST_F(EnumsTest, ClassWithEveryPart) {
+  MakeWorld(TargetType::DynamicLinkLibrary);
+  AssertGenerated("$enum+ class Level : [ \"doc\" ] { low, default -mid, high = 8 + 2, top, };\n",
+                  R"(class Level : public vesk::EnumBaseForRefinedLabels<Level>
+{
+    public:
+    enum Enum : int
+    {
+        low=0,
+        mid=1,
+        high=10,
+        top=11
+    };
+    Level(Enum _v) : EnumBaseForRefinedLabels(_v) {}
+    explicit Level(int _v = 1) : EnumBaseForRefinedLabels(_v) {}
+    enum { LEN = 4 };
+    static vesk::ConstStringZ const * stringArray()
+    {
+        static vesk::ConstStringZ const _s[] = 
+        {
+            "low",
+            "mid",
+            "high",
+            "top",
+        };
+        return _s;
+    }
+    static const vesk::int32* valueArray()
+    {
+        static const vesk::int32 _s[] = 
+        {
+            0,
+            1,
+            10,
+            11,
+        };
+        return _s;
+    }
+    static const bool* enabledArray()
+    {
+        static const bool _s[] = 
+        {
+            true,
+            false,
+            true,
+            true,
+        };
+        return _s;
+    }
+};
+app_API vesk::ReflectedEnum const& _GetReflected(Level const*);
+inline vesk::TypeOps const& _GetTypeOps(Level const*) { return vesk::GetTypeOps<vesk::int32>(); }
+)" + TraitsText("Level", "enum", "1111") +
+                      "\n",
+                  R"(
+//### $enum+ Level
+namespace vesk { XTarget* app_GetXTarget(); }
+    app_API vesk::ReflectedEnum const& _GetReflected(Level const*)
+    {
+        static const vesk::octet_t Level_metadata[] =
+        {
+            0xe1,0xa4,0x00,0x00
+        };
+        static vesk::ConstStringZ Level_stringTable[] =
+        {
+            "doc",
+        };
+        static const vesk::ReflectedEnum Level_enum =
+        {
+            "Level",
+            Level_metadata,
+            Level_stringTable,
+            4,
+            Level::stringArray(),
+            Level::valueArray(),
+            Level::enabledArray()
+        };
+        return Level_enum;
+    }
+    
+    // Registration of $enum+ Level
+    void _Register_Level()
+    {
+        vxVerify(vesk::RegisterReflectedEnum(&_GetReflected( (Level*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);
+    }
+)");
+}
+
+TEST_F(EnumsTest, PlainInNameSpaceReflectedButNotRegistered) {
+  AssertGenerated("namespace n { $enum E <<reflect>> { a, -b }; }\n", R"(namespace n { enum E : int
+{
+    a,
+    b
+};
+vesk::ReflectedEnum const& _GetReflected(E const*);
+inline vesk::TypeOps const& _GetTypeOps(E const*) { return vesk::GetTypeOps<vesk::int32>(); }
+template<typename Archive> inline void Serialise(Archive& _ar,E _x) { vesk::SerialiseVariableLengthUint(_ar, (int)_x); }
+template<typename Archive> inline void Deserialise(Archive& _ar,E& _x) { vesk::DeserialiseVariableLengthUint(_ar, (int&)_x); }
+
+} //n
+namespace vesk
+{
+template<> struct TypeTraits<n::E>
+{
+    static const bool is_exported = 0;
+    static const bool is_reflected = 1;
+    static const bool is_registered = 0;
+    static const vesk::ETypeTraitKind kind = vesk::TTK_enum;
+    static const bool has_metadata = 0;
+};
+} // namespace vesk
+namespace n
+{
+ }
+)",
+                  R"(
+//### $enum n::E
+namespace vesk { XTarget* app_GetXTarget(); }
+namespace n
+{
+    vesk::ReflectedEnum const& _GetReflected(E const*)
+    {
+        static vesk::ConstStringZ E_strings[] =
+        {
+            "a",
+            "b",
+        };
+        static const bool E_enabled[] =
+        {
+            true,
+            false,
+        };
+        static const vesk::ReflectedEnum E_enum =
+        {
+            "n::E",
+            0,
+            0,
+            2,
+            E_strings,
+            0,
+            E_enabled
+        };
+        return E_enum;
+    }
+} // n
+)");
+}
+
+TEST_F(EnumsTest, WithoutLabels) {
+  const Generated generated = TranslateHeader("$enum class C { };\n$enum+ P <<-register>> { };\n");
+  EXPECT_EQ(0u, generated.header.find(R"(class C : public vesk::EnumBase<C>
+{
+    public:
+    enum Enum : int
+    {
+    };
+    C(Enum _v) : EnumBase(_v) {}
+    explicit C(int _v = 0) : EnumBase(_v) {}
+    enum { LEN = 0 };
+    static vesk::ConstStringZ const * stringArray()
+    {
+        static vesk::ConstStringZ const _s[] = 
+        {
+        };
+        return _s;
+    }
+};
+)" + TraitsText("C", "enum", "0000") + "\nenum P : int\n{\n};\nvesk::ReflectedEnum const& _GetReflected(P const*);\n"));
+  EXPECT_EQ(R"(
+//### $enum+ P
+namespace vesk { XTarget* app_GetXTarget(); }
+    vesk::ReflectedEnum const& _GetReflected(P const*)
+    {
+        static const vesk::ReflectedEnum P_enum =
+        {
+            "P",
+            0,
+            0,
+            0,
+            0,
+            0,
+            0
+        };
+        return P_enum;
+    }
+)",
+            generated.tail);
+}
+
+TEST_F(EnumsTest, Values) {
+  const auto valuesOf = [this](const std::string& entries) {
+    const std::string header = TranslateHeader("$enum E { " + entries + " };").header;
+    return header.substr(0, header.find("};"));
+  };
+  EXPECT_EQ("enum E : int\n{\n    a=0,\n    b=10,\n    c=11\n", valuesOf("a, b = 10, c"));
+  EXPECT_EQ("enum E : int\n{\n    a=-2,\n    b=-1,\n    c=0\n", valuesOf("a = -2, b, c"));
+  EXPECT_EQ("enum E : int\n{\n    a=-1,\n    b=0\n", valuesOf("a = 0xFFFFFFFF, b"));  // the low 32 bits
+}
+
+TEST_F(EnumsTest, ForwardDeclarations) {
+  AssertHeader("$enum class A;\n$enum B;\n$enum B;\n", "class A;\n\nenum B : int;\n\nenum B : int;\n\n");
+  AssertMessages({
+      {"\n$enum+ class A;", "t.h(2) : warning W1017 : + on forward declaration of A deprecated\n"},
+      {"$enum A;\n$enum A { a };", ""},
+      {"$enum E : [ 1 ] { a };", "t.h(1) : warning W1001 : Non-reflected $enum E contains metadata\n"},
+  });
+}
+
+TEST_F(EnumsTest, Errors) {
+  AssertErrors({
+      {"$struct S {\n$enum+ E { a }; };", "(2) : error : '+' modifier not permitted on nested enum"},
+      {"$enum + + E { a };", "(1) : error : '+' modifier repeated"},
+      {"$struct E;\n$enum E;", "(2) : error : $enum E conflicts with previous declaration of $struct E"},
+      {"$enum class E;\n$enum E;", "(2) : error : $enum E had 'class' modifier in an earlier declaration"},
+      {"$enum E;\n$enum class E;", "(2) : error : $enum E didn't have 'class' modifier in an earlier declaration"},
+      {"$enum E { a };\n$enum E { a };", "(2) : error : Repeated definition of $enum E"},
+      {"$enum E <<\ncopy>> { a };", "(2) : error : Unrecognised qualifier << copy >> on $enum E"},
+      {"$enum 7 { };", "(1) : error : Expected identifier after enum when read 7"},
+      {"$enum E : 1", "(1) : error : Expected [ after : when read 1"},
+      {"$enum E\n( a );", "(2) : error : Expected { after E when read ("},
+      {"$enum E { a,\ndefault b };", "(2) : error : Default specifier only supported on $enum class"},
+      {"$enum class E { default a,\ndefault b };", "(2) : error : Repeated default specifier in $enum E"},
+      {"$enum E { - };", "(1) : error : Expected identifier after - when read }"},
+      {"$enum E { a b };", "(1) : error : Expected , or } after a when read b"},
+      {"$enum E { a", "(1) : error : Expected , or } after a when read EOS"},
+      {"$enum E { a }\nint x;", "(2) : error : ; expected after definition of $enum E when read int"},
+  });
+}
+
+}  // namespace
+}  // namespace qrex

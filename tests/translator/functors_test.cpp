@@ -1,0 +1,213 @@
+// $functor: the class and the record; $makefunctor and $makeconstfunctor: instances in code.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class FunctorsTest : public TranslateTest {
+ protected:
+  // What comes of `code` behind the declarations of a functor with a result and one without.
+  std::string Instance(const std::string& code) {
+    const std::string text = "$functor int32 F(int32 a, string8 const& b); $functor void G();\n//\n" + code;
+    const std::string header = TranslateHeader(text).header;
+    return header.substr(header.find("//\n") + 3);
+  }
+};
+
+TEST_F(FunctorsTest, Class) {
+  AssertGenerated("$functor+ bool F(int32 a = 1, string8 const& b) : [ 7 ];\n", R"(class F
+{
+public:
+    typedef bool (__stdcall *STUB_FN)(void* _self,vesk::int32 a,vesk::string8 const& b);
+    F() : m_self(nullptr), m_stubFn(nullptr) {}
+    F(void* _self, STUB_FN _stubFn) : m_self(_self), m_stubFn(_stubFn) {}
+    F(F const& _rhs) : m_self(_rhs.m_self), m_stubFn(_rhs.m_stubFn) {}
+    F& operator=(F const& _rhs) { m_self = _rhs.m_self; m_stubFn = _rhs.m_stubFn; return *this; }
+    bool operator==(F const& _rhs) const { return m_self == _rhs.m_self && m_stubFn == _rhs.m_stubFn; }
+    bool operator<(F const& _rhs) const { return m_self < _rhs.m_self || (m_self == _rhs.m_self && m_stubFn < _rhs.m_stubFn); }
+    bool operator<=(F const& _rhs) const { return m_self < _rhs.m_self || (m_self == _rhs.m_self && m_stubFn <= _rhs.m_stubFn); }
+    bool operator!=(F const& _rhs) const { return !operator==(_rhs); }
+    bool operator>(F const& _rhs) const { return _rhs.operator<(*this); }
+    bool operator>=(F const& _rhs) const { return _rhs.operator<=(*this); }
+    typedef void (F::*bool_type)() const;
+    void bool_type_mem_fn() const {}
+    operator bool_type() const { return m_stubFn ? &F::bool_type_mem_fn : 0; }
+    F& operator=(vesk::NullInterface) { m_self = nullptr; m_stubFn = nullptr; return *this; }
+    bool operator()(vesk::int32 a=1,vesk::string8 const& b) { return m_stubFn(m_self,a,b); }
+    void write(vesk::xostream& os) const { os << "F(" << m_self << ',' << (void*)m_stubFn << ')'; }
+private:
+    void* m_self;
+    STUB_FN m_stubFn;
+};
+inline vesk::xostream& operator<<(vesk::xostream& os, F f) { f.write(os); return os; }
+)" + TraitsText("F", "functor", "1111") + ";\n",
+                  R"(
+//### $functor+ F
+namespace vesk { XTarget* app_GetXTarget(); }
+    vesk::ReflectedFunctor const& _GetReflected(F const*)
+    {
+        static const vesk::octet_t F_metadata[] =
+        {
+            0xe1,0xa2,0x07,0x00,0x00,0x00
+        };
+        static const vesk::octet_t F_return[] =
+        {
+            0x01
+        };
+        static const vesk::octet_t F_a[] =
+        {
+            0x04
+        };
+        static const vesk::octet_t F_b[] =
+        {
+            0x36,0x31,0x10
+        };
+        static const vesk::ReflectedArg F_args[] =
+        {
+            { "a", F_a },
+            { "b", F_b },
+        };
+        static const vesk::ReflectedFunctor F_functor =
+        {
+            "F",
+            {F_return},
+            F_args,2,
+            F_metadata,
+            0,
+        };
+        return F_functor;
+    }
+    
+    // Registration of $functor+ F
+    void _Register_F()
+    {
+        vxVerify(vesk::RegisterReflectedFunctor(&_GetReflected( (F*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);
+    }
+)");
+}
+
+TEST_F(FunctorsTest, WithoutResultOrArguments) {
+  const Generated generated = TranslateHeader("$functor void G();\n");
+  EXPECT_NE(std::string::npos, generated.header.find("typedef void (__stdcall *STUB_FN)(void* _self);\n"));
+  EXPECT_NE(std::string::npos, generated.header.find("    void operator()() { m_stubFn(m_self); }\n"));
+  EXPECT_EQ("", generated.tail);
+}
+
+TEST_F(FunctorsTest, InClassBodyHasNoTraits) {
+  const std::string header = TranslateHeader("struct Before;\n$struct S\n{\n    $functor void G();\n};\n").header;
+  EXPECT_EQ(std::string::npos, header.find("TypeTraits<G>")) << header;
+  EXPECT_NE(std::string::npos, header.find("{ f.write(os); return os; }\n;\n")) << header;
+}
+
+TEST_F(FunctorsTest, PlainInstances) {
+  EXPECT_EQ(R"(void use()
+{
+    struct f_delegator
+{
+    static vesk::int32 __stdcall static_delegate(void* _self,vesk::int32 a,vesk::string8 const& b)
+    {
+        if (a)
+            return 1;
+        return 2;
+    }
+};
+
+F f(NULL,f_delegator::static_delegate);
+    f(1, "");
+}
+)",
+            Instance("void use()\n{\n    $makefunctor F f\n    {\n        if (a)\n            return 1;\n"
+                     "        return 2;\n    }\n    f(1, \"\");\n}\n"));
+  EXPECT_EQ(R"(struct g_delegator
+{
+    static void __stdcall static_delegate(void* _self)
+    {
+        go();
+    }
+};
+
+G g(NULL,g_delegator::static_delegate);
+)",
+            Instance("$makeconstfunctor G g { go(); }\n"));
+}
+
+TEST_F(FunctorsTest, BoundInstances) {
+  EXPECT_EQ(R"(struct f_delegator : public Base<int, char>
+{
+    vesk::int32 member_delegate(vesk::int32 a,vesk::string8 const& b)
+    {
+        return a + m_n;
+    }
+    static vesk::int32 __stdcall static_delegate(void* _self,vesk::int32 a,vesk::string8 const& b)
+    {
+        return static_cast<f_delegator*>(_self)->member_delegate(a,b);
+    }
+};
+
+F f(find(x, y),f_delegator::static_delegate);;
+)",
+            Instance("$makefunctor F f(find(x, y), `Base<int, char>`) { return a + m_n; };\n"));
+  EXPECT_EQ(R"(struct g_delegator : public Base
+{
+    void member_delegate() const
+    {
+        go();
+    }
+    static void __stdcall static_delegate(void* _self)
+    {
+        static_cast<g_delegator*>(_self)->member_delegate();
+    }
+};
+
+G g(const_cast<Base*>(this),g_delegator::static_delegate);
+)",
+            Instance("$makeconstfunctor G g(this, Base)\n{\n\tgo();\n}\n"));
+}
+
+TEST_F(FunctorsTest, Indentation) {
+  const auto bodyOf = [this](const std::string& body) {
+    const std::string text = Instance("$makefunctor G g\n{" + body + "}\n");
+    const std::string head = "static_delegate(void* _self)\n";
+    const size_t begin = text.find(head) + head.size();
+    return text.substr(begin, text.find("};") - begin);
+  };
+  EXPECT_EQ("    {\n        a();\n            b();\n        c();\n    }\n",
+            bodyOf("\n\ta();\n\t    b();\n    c();\n"));  // a tab counts 4
+  EXPECT_EQ("    {\n        a();\n        b();\n    }\n", bodyOf("\n    a();\n  b();\n"));
+}
+
+TEST_F(FunctorsTest, Messages) {
+  AssertMessages({
+      {"\n$functor <<-reflect>> void F();",
+       "t.h(2) : warning W1004 : $functor  is not reflected and has redundant << >> directives\n"},
+      {"$functor void F() : [ 1 ];", "t.h(1) : warning W1001 : Non-reflected $functor F contains metadata\n"},
+      {"$enum E { a };\n$functor+ E F();",
+       "t.h(2) : warning W1002 : Reflected $functor+ F references non-registered $enum E\n"
+       "t.h(1) : see declaration of $enum E\n"},
+  });
+}
+
+TEST_F(FunctorsTest, Errors) {
+  const std::string functor = "$functor void F();\n";
+  AssertErrors({
+      {"$functor <<\ncopy>> void F();", "(2) : error : Unrecognised qualifier << copy >> on $functor "},
+      {"$functor void;", "(1) : error : Function name expected when read ;"},
+      {"$functor void F\n;", "(2) : error : Expected ( after F when read ;"},
+      {"$functor void F(int32 a b);", "(1) : error : , or ) expected in argument list when read b"},
+      {"$functor void F()\nconst;", "(2) : error : const specifier on global function prohibited"},
+      {"$functor void F([int32 a]);", "(1) : error : '[' unexpected.  Polymorphic argument not allowed here"},
+      {"$functor+ void F(int a);", "(1) : error : Can't accept platform dependent type: int"},
+      {functor + functor, "(2) : error : $functor F conflicts with previous declaration of $functor F"},
+      {"$functor void F()\nint x;", "(2) : error : ; expected after definition of $functor F when read int"},
+      {"$enum E { a };\n$makefunctor E e { }", "(2) : error : Expected functor identifier after E when read e"},
+      {functor + "$makefunctor F 7 { }", "(2) : error : Expected identifier after F when read 7"},
+      {functor + "$makefunctor F f(a) { }", "(2) : error : Expected , after ( when read )"},
+      {functor + "$makefunctor F f(a, b, c) { }", "(2) : error : Expected ) after , when read ,"},
+      {functor + "$makefunctor F f;", "(2) : error : Expected { after f when read ;"},
+      {functor + "$makefunctor F f { ", "(2) : error : Met EOS before read matching brace"},
+  });
+}
+
+}  // namespace
+}  // namespace qrex
