@@ -259,7 +259,10 @@ void InterfaceStatement::ReadBases() {
 }
 
 void InterfaceStatement::CheckBases() {
+  constexpr size_t kMaxTables = 10000;
   const auto& bases = m_def->m_bases;
+  for (const InterfaceDef* base : bases) m_def->m_numTables += base->m_numTables;
+  if (m_def->m_numTables > kMaxTables) m_parser.Fail("Too many base interfaces of " + PrintedElement(*m_def));
   const auto subtypes =
       std::count_if(bases.begin(), bases.end(), [](const auto* base) { return base->SubtypesIObject(); });
   if (m_parser.WarningOn(1006) && subtypes > 0 && static_cast<size_t>(subtypes) < bases.size()) {

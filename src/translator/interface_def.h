@@ -47,6 +47,7 @@ class InterfaceDef : public NameSpaceElement {
   bool m_isIpc = false;
   bool m_isRmi = false;
   std::vector<InterfaceDef*> m_bases;
+  size_t m_numTables = 1;  // its own and those of its bases, which its function table embeds once per path
   std::vector<FunctionSignature> m_methods;  // declared ones, then those made from attributes
   size_t m_numDeclaredMethods = 0;
   std::vector<AttributeDef> m_attributes;

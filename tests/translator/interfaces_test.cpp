@@ -410,6 +410,16 @@ $interface D : A { };
             "t.h(6) : warning W1007 : $interface D subtypes IObject but isn't reflected\n");
 }
 
+// Each diamond doubles what a function table embeds.
+TEST_F(InterfacesTest, LadderOfDiamonds) {
+  std::string text = "$interface A0 { }; $interface B0 { };\n";
+  for (int i = 0; i < 30; ++i) {
+    const std::string heading = ToString(i + 1) + " : A" + ToString(i) + ", B" + ToString(i) + " { }; ";
+    text += "$interface A" + heading + "$interface B" + heading + "\n";
+  }
+  AssertErrors({{text, "(14) : error : Too many base interfaces of $interface A13"}});
+}
+
 TEST_F(InterfacesTest, Faults) {
   AssertErrors({
       {"$interface+ + I { };", "(1) : error : '+' modifier repeated"},
