@@ -31,7 +31,7 @@ void LSMacroVariable::WriteDefinition(TextWriter& writer) const { writer << Sign
 void LSMacroVariable::WriteValue(TextWriter& writer) const { writer << body.View(); }
 std::unique_ptr<LSVariable> LSMacroVariable::Clone() const { return std::make_unique<LSMacroVariable>(*this); }
 
-void LSMacroVariable::OwnText(const TextRange& text) {
+void LSMacroVariable::OwnText(TextRange text) {
   auto owned = std::make_shared<const std::string>(text.View());
   auto move = [&](TextRange& range) {
     if (range.Empty()) range.end = range.begin;

@@ -48,7 +48,7 @@ class LSMacroVariable : public LSVariable {
   std::unique_ptr<LSVariable> Clone() const override;
   std::string Signature() const;
   // Makes name, formals and body refer to a copy of `text`, in which they lie now.
-  void OwnText(const TextRange& text);
+  void OwnText(TextRange text);  // by value: it may be one of them
 
   bool isPython = false;
   bool isNaked = false;
