@@ -1,7 +1,6 @@
 #include "workspace/switch_blocks.h"
 
 #include <algorithm>
-#include <cstdlib>
 
 #include "lex/literals.h"
 #include "text/numbers.h"
@@ -18,6 +17,13 @@ constexpr std::string_view kAdditionalOptions = "AdditionalOptions";
 void AppendText(std::string& text, std::string_view more) {
   if (!text.empty()) text += ' ';
   text += more;
+}
+
+// A value text such as "2"; an item such as "3rdparty" is none.
+bool IsNonZeroInteger(const std::string& text) {
+  int64_t value;
+  std::string error;
+  return ParseNumber(text, value, error) && value != 0;
 }
 
 bool BeginsWithAny(std::string_view text, std::span<const std::string_view> prefixes) {
@@ -197,7 +203,7 @@ void SwitchChanges::ApplyToFile(OptionMap& record, const OptionMap& configOption
   for (const auto& [property, value] : entries) {
     if (value == "true" || value == "false") {
       record[property] = value == "true" ? "false" : "true";
-    } else if (std::atoll(value.c_str()) != 0) {
+    } else if (IsNonZeroInteger(value)) {
       record[property] = "0";
     } else if (!IsList(property)) {
       TraceWriter() << "Warning, unable to subtract option " << property << " = \"" << value

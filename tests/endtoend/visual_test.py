@@ -1,0 +1,250 @@
+#!/usr/bin/env python3
+"""Builds with the command lines of the Visual C++ family, which drop-in tools carry out: clang's cl mode, lld-link and
+llvm's librarian, assembler, resource compiler and manifest tool, under the names that a build calls."""
+
+import glob
+import os
+import shutil
+import struct
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import Skipped, Workspace, equal, holds, lacks, run_tests  # noqa: E402
+
+
+def tool(name):
+    """The path of a tool of the compiler suite, which may be installed under a versioned name only."""
+    found = [shutil.which(name)] + sorted(glob.glob(f"/usr/lib/llvm-*/bin/{name}") + glob.glob(f"/usr/bin/{name}-*"))
+    found = [path for path in found if path]
+    if not found:
+        raise Skipped(name)
+    return found[0]
+
+
+def tools():
+    """The wrappers, by their names. The assembler and the manifest tool take no response file and fewer switches."""
+    clang = tool("clang")
+    scripts = {
+        "cl": f'exec {clang} --driver-mode=cl --target=x86_64-pc-windows-msvc -fno-show-column -fno-color-diagnostics '
+              '"$@" 2>&1',
+        "link.exe": f'exec {tool("lld-link")} "$@" 2>&1',
+        "lib.exe": f'exec {tool("llvm-lib")} "$@" 2>&1',
+        "ml64": f"""for argument; do case $argument in @*) text=$(cat "${{argument#@}}");; esac; done
+folder=${{text#*/Fo\\"}}; folder=${{folder%%\\"*}}
+input=${{text##* \\"}}; input=${{input%\\"}}; stem=${{input##*/}}
+exec {tool("llvm-ml")} -m64 /c /Fo "$folder${{stem%.*}}.obj" "$input" 2>&1""",
+        "rc.exe": f'PATH=$PATH:{os.path.dirname(clang)} exec {tool("llvm-rc")} "$@"',
+        "mt.exe": f"""text=$(cat "${{1#@}}")
+target=${{text#*:\\"}}; target=${{target%%\\"*}}
+manifest=${{text##* \\"}}; manifest=${{manifest%%\\"*}}
+[ -f "$target" ] && exec {tool("llvm-mt")} /manifest "$manifest" /out:"$target.manifest" """,
+    }
+    return {f"tools/{name}": f"#!/bin/bash\n{script}\n" for name, script in scripts.items()}
+
+
+SETTINGS = """virtualTree = { "tree" }
+$EXPORT_LIB = "out/lib"
+$EXPORT_TRANSLATED_INCLUDE = "out/include"
+$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
+workspaces = { "all.qrws" }
+compiler = vc14
+systemName = "Windows"
+config = "Debug"
+platform = "Win64"
+mode = build
+PATH("Win64") = { "tools" "/usr/bin" "/bin" }
+INCLUDE("Win64") = { "inc" }
+LIB("Win64") = { "lib" }
+"""
+
+FILES = {
+    "all.qrex": SETTINGS,
+    "tree/.qrwsroot": "",
+    "tree/all.qrws": '"all" { "app" }\n',
+    "tree/common.inc": """config { "Debug|Win64" }
++cpp { /nologo /W3 /GS- /Zl /D "LEVEL=7" }
+""",
+    "tree/base/src/base.qrpj": """$TARGET_TYPE = "Static Library"
+$ROOT_TO_PROJDIR = "base"
+@import "common.inc"
++link { /OUT:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/$(PROJNAME).$(TGT_EXTENSION)" }
+qrex
+{ "level.h" "src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } , +cpp { /O2 } "level.cpp" "base.cpp" "twice.asm" } }
+""",
+    "tree/base/level.h": "@def offset = { 35 }\n\nint Level(int start);\ninline int Offset() { return offset; }\n",
+    "tree/base/src/StdAfx.h": "@import \"base/level.h\"\n",
+    "tree/base/src/StdAfx.cpp": '#include "StdAfx.h"\n',
+    "tree/base/src/level.cpp": '#include "StdAfx.h"\nint Level(int start)\n{\n    return start + LEVEL;\n}\n',
+    "tree/base/src/base.cpp": '#include "StdAfx.h"\n@import "base/level.h"\n',
+    "tree/base/src/twice.asm": ".code\nTwice PROC\n    lea rax, [rcx+rcx]\n    ret\nTwice ENDP\nEND\n",
+    "tree/shape/src/shape.qrpj": """$TARGET_TYPE = "Dynamic-Link Library"
+$ROOT_TO_PROJDIR = "shape"
+@import "common.inc"
++link {
+  /DLL /NOENTRY /NODEFAULTLIB /OUT:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/shape.dll"
+  /IMPLIB:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/shape.lib" /MANIFEST
+  /MANIFESTFILE:"$(PLATFORM)/$(CONFIG)/shape/shape.dll.intermediate.manifest"
+}
+qrex
+{ "shape.h" "src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "shape.cpp" "shape.rc" } }
+""",
+    "tree/shape/shape.h": "#ifdef SHAPE\n#define API __declspec(dllexport)\n#else\n#define API __declspec(dllimport)\n#endif\n"
+                          "API int Area(int a, int b);\n",
+    "tree/shape/src/StdAfx.h": '#define SHAPE\n@import "shape/shape.h"\n',
+    "tree/shape/src/StdAfx.cpp": '#include "StdAfx.h"\n',
+    "tree/shape/src/shape.cpp": '#include "StdAfx.h"\n@import "StdAfx.h"\nint Area(int a, int b)\n{\n    return a * b;\n}\n',
+    "tree/shape/src/shape.rc": "1 VERSIONINFO\nFILEVERSION 1,2,3,4\nBEGIN\nEND\n",
+    "tree/app/src/app.qrpj": """$TARGET_TYPE = "Console Application"
+$ROOT_TO_PROJDIR = "app"
+@import "common.inc"
+subproj { "base" "shape" }
++link {
+  /ENTRY:Start /SUBSYSTEM:CONSOLE /NODEFAULTLIB /OUT:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/app.exe"
+  /MANIFEST /MANIFESTFILE:"$(PLATFORM)/$(CONFIG)/app/app.exe.intermediate.manifest"
+}
+qrex
+{ "src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "app.cpp" } }
+""",
+    "tree/app/src/StdAfx.h": '@import "base/level.h"\n@import "shape/shape.h"\n',
+    "tree/app/src/StdAfx.cpp": '#include "StdAfx.h"\n@import "StdAfx.h"\n',
+    "tree/app/src/app.cpp": """#include "StdAfx.h"
+@import "StdAfx.h"
+extern "C" int Twice(int);
+extern "C" int Start()
+{
+    return Level(Offset()) == 42 && Area(6, 7) == Twice(21) ? 0 : 1;
+}
+""",
+}
+OBJECTS = "Win64/**/*.obj"
+TARGETS = "out/lib/Win64/Debug/*"
+MACHINE_X64, IS_DLL, CONSOLE = 0x8664, 0x2000, 3
+
+
+def new_workspace(binary):
+    return Workspace(binary, {**tools(), **FILES})
+
+
+def image(path):
+    """Machine, characteristics and subsystem of a PE file; fails when it is none."""
+    data = path.read_bytes()
+    equal(data[:2], b"MZ")
+    header = struct.unpack_from("<I", data, 0x3C)[0]
+    equal(data[header:header + 4], b"PE\0\0")
+    machine, sections, _, _, _, optional_size, characteristics = struct.unpack_from("<HHIIIHH", data, header + 4)
+    equal(struct.unpack_from("<H", data, header + 24)[0], 0x20B)
+    subsystem = struct.unpack_from("<H", data, header + 24 + 68)[0]
+    table = header + 24 + optional_size
+    names = [data[at:at + 8].rstrip(b"\0").decode() for at in range(table, table + 40 * sections, 40)]
+    return machine, characteristics & IS_DLL, subsystem, names
+
+
+def libraries_and_a_program(binary):
+    with new_workspace(binary) as workspace:
+        output = workspace.run("all.qrex")
+        holds(output, "- base  [Debug|Win64]", "Linking...\n", "- shape  [", "Compiling resource file shape/src/shape.rc\n",
+              "Linking...\n", "- app  [", "Linking...\n", "\nCompleted....")
+        equal(workspace.path("out/lib/Win64/Debug/base.lib").read_bytes()[:8], b"!<arch>\n")
+        machine, is_dll, _, sections = image(workspace.path("out/lib/Win64/Debug/shape.dll"))
+        equal((machine, is_dll, ".rsrc" in sections), (MACHINE_X64, IS_DLL, True))
+        equal(image(workspace.path("out/lib/Win64/Debug/app.exe"))[:3], (MACHINE_X64, 0, CONSOLE))
+        for project in ("app", "shape"):
+            holds(workspace.path(f"Win64/Debug/{project}/mt.dep").read_text(), "Manifest resource last updated at ")
+        equal([str(path) for path in workspace.folder.glob("**/*.rsp")], [])
+
+        before = workspace.times("Win64/**/*"), workspace.times(TARGETS)
+        lacks(workspace.run("all.qrex"), "Linking...")
+        equal((workspace.times("Win64/**/*"), workspace.times(TARGETS)), before)
+
+        workspace.append("tree/shape/shape.h", "int More();\n")
+        workspace.run("all.qrex")
+        equal(workspace.changed(before[0], OBJECTS), ["Win64/Debug/app/StdAfx.obj", "Win64/Debug/app/app.obj",
+                                                      "Win64/Debug/shape/shape.obj"])
+
+
+def command_lines(binary):
+    with new_workspace(binary) as workspace:
+        output = workspace.run("all.qrex", "diagnostics=true")
+        includes = lambda project: "".join(f' /I "{path}"' for path in (  # noqa: E731
+            f"qrexsource/Win64/Debug/{project}", f"qrexsource/Win64/Debug/{project}/src", "qrexsource/Win64/Debug", "tree"))
+        switches = '/GS- /Zl /D "LEVEL=7" /nologo /W3 '
+        holds(output,
+              "Compiling base/src/StdAfx.cpp\n",
+              f'Win64/Debug/base/compiler.rsp = {switches}/Yc"StdAfx.h" {includes("base")} /Fp"Win64/Debug/base/base.pch" '
+              '/Fo"Win64/Debug/base/" /Fd"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/StdAfx.cpp"\n',
+              'cmd /c cl /c @"Win64/Debug/base/compiler.rsp" 1>out1.txt\n',
+              "Compiling base/src/level.cpp\n", f'= {switches}/Yu"StdAfx.h" {includes("base")} ',
+              "Assembling base/src/twice.asm\n",
+              'Win64/Debug/base/masm.rsp =  /Fo"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/twice.asm"\n'
+              'cmd /c ml64 /c /Cx /nologo @"Win64/Debug/base/masm.rsp" 1>out1.txt\n',
+              "Linking...\n",
+              'Win64/Debug/base/linker.rsp =  /OUT:"out/lib/Win64/Debug/base.lib" "Win64/Debug/base/StdAfx.obj" '
+              '"Win64/Debug/base/level.obj" "Win64/Debug/base/base.obj" "Win64/Debug/base/twice.obj"\n'
+              'lib.exe @"Win64/Debug/base/linker.rsp"\n',
+              "Compiling resource file shape/src/shape.rc\n",
+              'rc.exe  /fo"Win64/Debug/shape/shape.res" "tree/shape/src/shape.rc"\n',
+              "Win64/Debug/shape/linker.rsp =  /DLL /NOENTRY /NODEFAULTLIB", ' "Win64/Debug/shape/shape.res"',
+              "Embedding manifest...\n"
+              '/outputresource:"out/lib/Win64/Debug/shape.dll";#2 /manifest '
+              '"./Win64/Debug/shape/shape.dll.intermediate.manifest"\n'
+              'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\n',
+              '"Win64\\Debug\\shape\\mtdep.bat"\n',
+              ' "Win64/Debug/app/app.obj" "out/lib/Win64/Debug/base.lib" "out/lib/Win64/Debug/shape.lib"\n'
+              'link.exe @"Win64/Debug/app/linker.rsp"\n',
+              '/outputresource:"out/lib/Win64/Debug/app.exe";#1 /manifest ')
+
+
+def messages_are_counted_and_point_at_the_source(binary):
+    with new_workspace(binary) as workspace:
+        workspace.append("tree/base/src/base.cpp", "\nint Narrow()\n{\n    int unset;\n    return unset;\n}\n")
+        workspace.append("tree/base/src/level.cpp", "int Broken()\n{\n    return nowhere;\n}\n")
+        workspace.append("tree/app/src/app.cpp", "int Level(char*);\nint wrong = Level(\"x\");\n")
+        workspace.replace("tree/common.inc", "/W3", "/W4")
+        output = workspace.run("all.qrex")
+        holds(output, "- base  [",
+              "tree/base/src/level.cpp(8) ...\nqrexsource/Win64/Debug/base/src/level.cpp(",
+              "): error: use of undeclared identifier 'nowhere'\n",
+              "tree/base/src/base.cpp(6) ...\nqrexsource/Win64/Debug/base/src/base.cpp(", "): warning: ",
+              "- app  [", "tree/app/src/app.cpp(9) ...\n", "): error: ", "\nCompleted with 1 warnings, 2 errors.")
+        equal(sorted(name for name in workspace.times(TARGETS) if not name.endswith(".manifest")),
+              ["out/lib/Win64/Debug/shape.dll", "out/lib/Win64/Debug/shape.lib"])
+        workspace.replace("tree/base/src/level.cpp", "nowhere", "0")
+        workspace.replace("tree/app/src/app.cpp", '"x"', "1")
+        output = workspace.run("all.qrex")
+        holds(output, "- base  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
+        image(workspace.path("out/lib/Win64/Debug/app.exe"))
+
+
+def failing_steps_are_counted_and_the_next_run_recovers(binary):
+    def fails(workspace, name, script, *messages):
+        original = workspace.path(f"tools/{name}").read_text()
+        workspace.write(f"tools/{name}", f"#!/bin/bash\n{script}\n")
+        output = workspace.run("all.qrex")
+        holds(output, *messages)
+        workspace.write(f"tools/{name}", original)
+        workspace.run("all.qrex")
+        lacks(workspace.output, "errors")
+        image(workspace.path("out/lib/Win64/Debug/app.exe"))
+
+    with new_workspace(binary) as workspace:
+        fails(workspace, "mt.exe", "exit 31", 'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\nReturn code : 31\n',
+              "\nCompleted with 0 warnings, 2 errors.")
+        workspace.append("tree/shape/src/shape.rc", "2 VERSIONINFO\nBEGIN\nEND\n")
+        fails(workspace, "rc.exe", "exit 1", "Compiling resource file shape/src/shape.rc\n", "Return code : 1\n",
+              "\nCompleted with 0 warnings, 1 errors.")
+        workspace.append("tree/app/src/app.cpp", "int more;\n")
+        fails(workspace, "cl", 'echo x > Win64/Debug/app/app.obj; kill -KILL $$', "ERROR: cl was ended by signal 9\n",
+              "\nCompleted with 0 warnings, 1 errors.")
+        workspace.append("tree/app/src/app.cpp", "int other;\n")
+        fails(workspace, "link.exe", 'echo x > out/lib/Win64/Debug/app.exe; kill -KILL $$',
+              "ERROR: link.exe was ended by signal 9\n", "Return code : 137\n", "Win64/Debug/app/linker.rsp:  /ENTRY:",
+              "\nCompleted with 0 warnings, 1 errors.")
+
+
+run_tests([
+    libraries_and_a_program,
+    command_lines,
+    messages_are_counted_and_point_at_the_source,
+    failing_steps_are_counted_and_the_next_run_recovers,
+])
