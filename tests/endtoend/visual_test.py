@@ -26,7 +26,7 @@ def tools():
     """The wrappers, by their names. The assembler and the manifest tool take no response file and fewer switches."""
     clang = tool("clang")
     scripts = {
-        "cl": f'exec {clang} --driver-mode=cl --target=x86_64-pc-windows-msvc -fno-show-column -fno-color-diagnostics '
+        "cl": f'exec {clang} --driver-mode=cl --target=x86_64-pc-windows-msvc -Xclang -fno-show-column '
               '"$@" 2>&1',
         "link.exe": f'exec {tool("lld-link")} "$@" 2>&1',
         "lib.exe": f'exec {tool("llvm-lib")} "$@" 2>&1',
@@ -74,9 +74,9 @@ qrex
 """,
     "tree/base/level.h": "@def offset = { 35 }\n\nint Level(int start);\ninline int Offset() { return offset; }\n",
     "tree/base/src/StdAfx.h": "@import \"base/level.h\"\n",
-    "tree/base/src/StdAfx.cpp": '#include "StdAfx.h"\n',
-    "tree/base/src/level.cpp": '#include "StdAfx.h"\nint Level(int start)\n{\n    return start + LEVEL;\n}\n',
-    "tree/base/src/base.cpp": '#include "StdAfx.h"\n@import "base/level.h"\n',
+    "tree/base/src/StdAfx.cpp": '@import "StdAfx.h"\n',
+    "tree/base/src/level.cpp": '@import "StdAfx.h"\nint Level(int start)\n{\n    return start + LEVEL;\n}\n',
+    "tree/base/src/base.cpp": '@import "StdAfx.h"\n',
     "tree/base/src/twice.asm": ".code\nTwice PROC\n    lea rax, [rcx+rcx]\n    ret\nTwice ENDP\nEND\n",
     "tree/shape/src/shape.qrpj": """$TARGET_TYPE = "Dynamic-Link Library"
 $ROOT_TO_PROJDIR = "shape"
@@ -92,8 +92,8 @@ qrex
     "tree/shape/shape.h": "#ifdef SHAPE\n#define API __declspec(dllexport)\n#else\n#define API __declspec(dllimport)\n#endif\n"
                           "API int Area(int a, int b);\n",
     "tree/shape/src/StdAfx.h": '#define SHAPE\n@import "shape/shape.h"\n',
-    "tree/shape/src/StdAfx.cpp": '#include "StdAfx.h"\n',
-    "tree/shape/src/shape.cpp": '#include "StdAfx.h"\n@import "StdAfx.h"\nint Area(int a, int b)\n{\n    return a * b;\n}\n',
+    "tree/shape/src/StdAfx.cpp": '@import "StdAfx.h"\n',
+    "tree/shape/src/shape.cpp": '@import "StdAfx.h"\nint Area(int a, int b)\n{\n    return a * b;\n}\n',
     "tree/shape/src/shape.rc": "1 VERSIONINFO\nFILEVERSION 1,2,3,4\nBEGIN\nEND\n",
     "tree/app/src/app.qrpj": """$TARGET_TYPE = "Console Application"
 $ROOT_TO_PROJDIR = "app"
@@ -107,9 +107,8 @@ qrex
 { "src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "app.cpp" } }
 """,
     "tree/app/src/StdAfx.h": '@import "base/level.h"\n@import "shape/shape.h"\n',
-    "tree/app/src/StdAfx.cpp": '#include "StdAfx.h"\n@import "StdAfx.h"\n',
-    "tree/app/src/app.cpp": """#include "StdAfx.h"
-@import "StdAfx.h"
+    "tree/app/src/StdAfx.cpp": '@import "StdAfx.h"\n',
+    "tree/app/src/app.cpp": """@import "StdAfx.h"
 extern "C" int Twice(int);
 extern "C" int Start()
 {
@@ -160,7 +159,7 @@ def libraries_and_a_program(binary):
         workspace.append("tree/shape/shape.h", "int More();\n")
         workspace.run("all.qrex")
         equal(workspace.changed(before[0], OBJECTS), ["Win64/Debug/app/StdAfx.obj", "Win64/Debug/app/app.obj",
-                                                      "Win64/Debug/shape/shape.obj"])
+                                                      "Win64/Debug/shape/StdAfx.obj", "Win64/Debug/shape/shape.obj"])
 
 
 def command_lines(binary):
@@ -168,7 +167,7 @@ def command_lines(binary):
         output = workspace.run("all.qrex", "diagnostics=true")
         includes = lambda project: "".join(f' /I "{path}"' for path in (  # noqa: E731
             f"qrexsource/Win64/Debug/{project}", f"qrexsource/Win64/Debug/{project}/src", "qrexsource/Win64/Debug", "tree"))
-        switches = '/GS- /Zl /D "LEVEL=7" /nologo /W3 '
+        switches = '/GS- /Zl /D "LEVEL=7" /D "base_STATIC_LIBRARY" /nologo /W3 '
         holds(output,
               "Compiling base/src/StdAfx.cpp\n",
               f'Win64/Debug/base/compiler.rsp = {switches}/Yc"StdAfx.h" {includes("base")} /Fp"Win64/Debug/base/base.pch" '
@@ -199,18 +198,18 @@ def messages_are_counted_and_point_at_the_source(binary):
     with new_workspace(binary) as workspace:
         workspace.append("tree/base/src/base.cpp", "\nint Narrow()\n{\n    int unset;\n    return unset;\n}\n")
         workspace.append("tree/base/src/level.cpp", "int Broken()\n{\n    return nowhere;\n}\n")
-        workspace.append("tree/app/src/app.cpp", "int Level(char*);\nint wrong = Level(\"x\");\n")
+        workspace.append("tree/app/src/app.cpp", "int wrong = nowhere;\n")
         workspace.replace("tree/common.inc", "/W3", "/W4")
         output = workspace.run("all.qrex")
         holds(output, "- base  [",
               "tree/base/src/level.cpp(8) ...\nqrexsource/Win64/Debug/base/src/level.cpp(",
               "): error: use of undeclared identifier 'nowhere'\n",
               "tree/base/src/base.cpp(6) ...\nqrexsource/Win64/Debug/base/src/base.cpp(", "): warning: ",
-              "- app  [", "tree/app/src/app.cpp(9) ...\n", "): error: ", "\nCompleted with 1 warnings, 2 errors.")
+              "- app  [", "tree/app/src/app.cpp(7) ...\n", "): error: ", "\nCompleted with 1 warnings, 2 errors.")
         equal(sorted(name for name in workspace.times(TARGETS) if not name.endswith(".manifest")),
               ["out/lib/Win64/Debug/shape.dll", "out/lib/Win64/Debug/shape.lib"])
         workspace.replace("tree/base/src/level.cpp", "nowhere", "0")
-        workspace.replace("tree/app/src/app.cpp", '"x"', "1")
+        workspace.replace("tree/app/src/app.cpp", "nowhere", "0")
         output = workspace.run("all.qrex")
         holds(output, "- base  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
         image(workspace.path("out/lib/Win64/Debug/app.exe"))

@@ -234,7 +234,7 @@ TEST_F(SwitchesTest, CommandLines) {
   config.compilerOptions = Applied(
       {{kAddCpp,
         "/GX /GZ /GR- /GL /nologo /W3 /I \"a b\" /I \"c\" /D \"X=1\" /MP4 /Zm200 /wd 4100 /Fo \"o\" /Yu /EHs"}});
-  ASSERT_EQ("/MP4 /Zm200 /I \"a b\" /I \"c\" /RTC1 /EHs /D \"X=1\" /GR- /nologo /W3 /GL ", switches(FileKind::C));
+  ASSERT_EQ("/I \"a b\" /I \"c\" /MP4 /Zm200 /RTC1 /EHs /D \"X=1\" /GR- /nologo /W3 /GL ", switches(FileKind::C));
   config.compilerOptions = {{"ExceptionHandling", "1"}, {"OpenMP", "false"}, {"Optimization", "9"}};
   ASSERT_EQ("/EHsc /Yu\"StdAfx.h\" ", switches(FileKind::Cpp));
   file.RecordOf(config).options["UsePrecompiledHeader"] = "1";
@@ -246,6 +246,7 @@ TEST_F(SwitchesTest, CommandLines) {
 
   config.resourceOptions = Applied({{kAddRc, "/x /v /I \"r\" /I \"s\" /d \"D\" /u \"U\" /l 0x409 /fo \"f\""}});
   MemoryTextWriter out;
+  trace.clear();
   WriteResourceSwitches(out, config);
   ASSERT_EQ("/I \"r\" /I \"s\" /x /d \"D\" /v /u \"U\" ", out.TakeText());
   ASSERT_EQ("Ignored : Culture = 0x409\nIgnored : ResourceOutputFileName = f\n", trace);
@@ -274,10 +275,10 @@ TEST_F(SwitchesTest, LinkerProperties) {
              "/uiaccess='TRUE' /SAFESEH:NO /LTCG:PGUPDATE /VERBOSE:CLR /errorReport:send /SwapRun:Net /DLL "
              "/pdbtype:sept"));
   ASSERT_EQ(
-      "AdditionalDependencies=\nAdditionalLibraryDirectories=a;b c\nAdditionalOptions=/OUT:x.exe /PDB: /ODD:\"1\"\n"
+      "AdditionalDependencies=\nAdditionalLibraryDirectories=a;b c\nAdditionalOptions=/out:x.exe /PDB: /ODD:\"1\"\n"
       "IgnoreAllDefaultLibraries=true\nIgnoreDefaultLibraryNames=libc\nKeyFile=k\nOutputFile=X.exe\n",
       Linked("/OUT:\"X.exe\" /out:x.exe /LIBPATH:\"a\" /libpath:\"b c\" /PDB: /NODEFAULTLIB /nodefaultlib:\"libc\" "
-             "/LIBPATH:\"\" /ODD:\"1\" /KeyFile:\"k\""));
+             "/ODD:\"1\" /KeyFile:\"k\""));
   ASSERT_EQ(
       "AdditionalDependencies=\nGenerateMapFile=true\nHeapReserveSize=0x10\nMapFileName=a.map\nStackCommitSize=4096\n"
       "StackReserveSize=1048576\n",
