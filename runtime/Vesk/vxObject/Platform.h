@@ -1,0 +1,114 @@
+// What the generated text takes for granted: scalar types, assertions, calling convention, casts from a member to the
+// object that holds it.
+
+#include <cstddef>
+#include <cstdint>
+#include <cstdlib>
+#include <iostream>
+#include <memory>
+#include <new>
+#include <type_traits>
+#include <utility>
+#include <sys/types.h>
+
+// Records list the offsets of fields of classes with bases. Every supported compiler lays these out as expected.
+#pragma GCC diagnostic ignored "-Winvalid-offsetof"
+
+#if !defined(_WIN32) && !defined(__stdcall)
+#define __stdcall
+#endif
+
+namespace vesk
+{
+
+typedef std::int8_t int8;
+typedef std::int16_t int16;
+typedef std::int32_t int32;
+typedef std::int64_t int64;
+__extension__ typedef __int128 int128;
+typedef std::uint8_t uint8;
+typedef std::uint16_t uint16;
+typedef std::uint32_t uint32;
+typedef std::uint64_t uint64;
+__extension__ typedef unsigned __int128 uint128;
+typedef float float32;
+typedef double float64;
+typedef char char8;
+typedef char16_t char16;
+typedef unsigned char octet_t;
+using ::ssize_t;
+
+typedef const char* ConstStringZ;
+typedef void (*FunctionPointer)();
+
+// A release number of a model's schema.
+typedef int64 RSN;
+
+// The null of interface pointers, functors and barriers without an object.
+struct NullInterface
+{
+};
+constexpr NullInterface null = {};
+
+[[noreturn]] inline void FailAssertion(ConstStringZ expression, ConstStringZ file, int line)
+{
+    std::cerr << file << "(" << line << ") : assertion failed : " << expression << std::endl;
+    std::abort();
+}
+
+}  // namespace vesk
+
+// Generated text spells scalar types without a name space in some places, and so may the signatures of `$` members.
+using vesk::char16;
+using vesk::char8;
+using vesk::float32;
+using vesk::float64;
+using vesk::int128;
+using vesk::int16;
+using vesk::int32;
+using vesk::int64;
+using vesk::int8;
+using vesk::uint128;
+using vesk::uint16;
+using vesk::uint32;
+using vesk::uint64;
+using vesk::uint8;
+
+#ifdef NDEBUG
+#define vxAssert(x) ((void)0)
+#else
+#define vxAssert(x) ((x) ? (void)0 : ::vesk::FailAssertion(#x, __FILE__, __LINE__))
+#endif
+
+// Like vxAssert, but evaluated in every build.
+#define vxVerify(x) ((x) ? (void)0 : ::vesk::FailAssertion(#x, __FILE__, __LINE__))
+#define vxAssertUnreachable() ::vesk::FailAssertion("unreachable", __FILE__, __LINE__)
+
+// From `this` of a member (an attribute struct, a node) to the object that holds it. No offsetof: MEMBER may be a path.
+#define VX_MEMBER_OFFSET(CLS, MEMBER) \
+    (reinterpret_cast<char*>(&reinterpret_cast<CLS*>(0x10000)->MEMBER) - reinterpret_cast<char*>(0x10000))
+#define ATTRIB_CAST(CLS, MEMBER) \
+    (reinterpret_cast<CLS*>(reinterpret_cast<char*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
+#define CONST_ATTRIB_CAST(CLS, MEMBER) \
+    (reinterpret_cast<CLS const*>(reinterpret_cast<char const*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
+
+// The storage of a variant: as large as its largest item. The number in the name is that of the items.
+namespace vesk
+{
+template <typename... Sizes>
+constexpr std::size_t MaxSize(Sizes... sizes)
+{
+    std::size_t most = 1;
+    ((most = static_cast<std::size_t>(sizes) > most ? static_cast<std::size_t>(sizes) : most), ...);
+    return most;
+}
+}  // namespace vesk
+@scope
+{
+    @let int items = 1
+    @while (items <= 64)
+    {
+        #define VESK_MAX@@@(items)(...) ::vesk::MaxSize(__VA_ARGS__)
+        @let items = items + 1
+    }
+}
