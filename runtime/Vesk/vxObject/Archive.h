@@ -148,7 +148,7 @@ template <typename T, typename = std::enable_if_t<IsContainer<T>>>
 void Serialise(Archive& ar, T const& v)
 {
     SerialiseVariableLengthUint(ar, v.size());
-    for (typename ContainerTraits<T>::element_type const& item : v) ar << item;
+    for (auto const& item : v) ar << item;
 }
 template <typename T, typename = std::enable_if_t<IsContainer<T>>, typename = void>
 void Deserialise(InputArchive& ar, T& v)

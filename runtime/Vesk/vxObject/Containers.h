@@ -214,7 +214,7 @@ xostream& operator<<(xostream& os, T const& items)
 {
     os.Write("[");
     bool isFirst = true;
-    for (typename ContainerTraits<T>::element_type const& item : items)
+    for (auto const& item : items)
     {
         if (!isFirst) os.Write(",");
         isFirst = false;

@@ -78,7 +78,7 @@ void Serialise(Archive& ar, cref<C> const& reference)
     }
     else
     {
-        ar << *reference;
+        SerialiseArray(ar, reference.Get(), 0, 1);
     }
 }
 
@@ -96,7 +96,7 @@ void Deserialise(InputArchive& ar, cref<C>& reference)
         {
             C* object = new C();
             ar.m_objects[number - 1].m_self = object;
-            ar >> *object;
+            DeserialiseArray(ar, object, 0, 1);
         }
     }
     reference = cref<C>();

@@ -13,6 +13,10 @@
 
 // Records list the offsets of fields of classes with bases. Every supported compiler lays these out as expected.
 #pragma GCC diagnostic ignored "-Winvalid-offsetof"
+// Functors are ordered by their functions.
+#ifdef __clang__
+#pragma clang diagnostic ignored "-Wordered-compare-function-pointers"
+#endif
 
 #if !defined(_WIN32) && !defined(__stdcall)
 #define __stdcall

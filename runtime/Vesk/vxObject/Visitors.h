@@ -88,7 +88,7 @@ void VisitParts(V& v, T const& x)
 {
     if constexpr (IsContainer<T>)
     {
-        for (typename ContainerTraits<T>::element_type const& item : x) v << item;
+        for (auto const& item : x) v << item;
     }
 }
 
