@@ -201,6 +201,13 @@ xostream& operator<<(xostream& os, std::pair<A, B> const& pair)
     return os << '(' << pair.first << ',' << pair.second << ')';
 }
 
+// Fields of models and nodes of the dependency graph print what they read.
+template <typename T, typename Value = decltype(std::declval<T const&>().read())>
+auto operator<<(xostream& os, T const& field) -> decltype(os << std::declval<Value>())
+{
+    return os << field.read();
+}
+
 template <typename Print>
 xstring TextOf(Print print)
 {

@@ -1,0 +1,3 @@
+@import "api/order1.h"
+
+vxDefineTarget(orders1, 1)
