@@ -1,260 +1,219 @@
-// The nodes of `$cache` functions: N the node's own class, C the class of the function, K its key, I the input of an async
-// calculation, O its output. A keyed function has one node per key. An async node answers the output that it has, and
-// queues the calculation when that is out of date; RunAsyncCalculations carries the queues out and tells who read it.
+// The nodes of `$cache` functions: N the node's own class, C the class of the function, K its key, I the input of an
+// async calculation, O its output. A keyed function has one node per key. An async node answers the output that it has,
+// and queues the calculation when that is out of date; RunAsyncCalculations carries the queues out and tells who read
+// it.
 
 @import "Vesk/vxObject/Graph.h"
 
-namespace vesk
-{
+namespace vesk {
 
 // --- One node per function, or one per key
 
 template <typename Node, typename N, typename C, typename O>
-class DGCacheNode : public Node
-{
-public:
-    typedef O output_type;
-    ssize_t ByteSize() const override { return CacheValueAdditionalSize(_output); }
-    void VisitContainingObject(IObjectVisitor& v) const override
-    {
-        v << _output << static_cast<N const*>(this)->_GetFinalSelf();
-    }
-    bool IsEvictable() const override { return CacheValueIsEvictable(_output); }
-    void OnEvict() const override
-    {
-        OnEvictCacheValue(_output);
-        ClearCacheValue(_output);
-    }
-    O const& read() const
-    {
-        this->ReadBarrier();
-        return _output;
-    }
+class DGCacheNode : public Node {
+ public:
+  typedef O output_type;
+  ssize_t ByteSize() const override { return CacheValueAdditionalSize(_output); }
+  void VisitContainingObject(IObjectVisitor& v) const override {
+    v << _output << static_cast<N const*>(this)->_GetFinalSelf();
+  }
+  bool IsEvictable() const override { return CacheValueIsEvictable(_output); }
+  void OnEvict() const override {
+    OnEvictCacheValue(_output);
+    ClearCacheValue(_output);
+  }
+  O const& read() const {
+    this->ReadBarrier();
+    return _output;
+  }
 
-    mutable O _output = O();
+  mutable O _output = O();
 };
 
 template <typename N, typename K>
-class DGNodeMap
-{
-public:
-    N& operator[](K const& key)
-    {
-        const auto [at, isNew] = m_nodes.try_emplace(key);
-        if (isNew) at->second.m_key = &at->first;
-        return at->second;
-    }
-    ssize_t size() const { return static_cast<ssize_t>(m_nodes.size()); }
-    typename std::map<K, N>::const_iterator begin() const { return m_nodes.begin(); }
-    typename std::map<K, N>::const_iterator end() const { return m_nodes.end(); }
+class DGNodeMap {
+ public:
+  N& operator[](K const& key) {
+    const auto [at, isNew] = m_nodes.try_emplace(key);
+    if (isNew) at->second.m_key = &at->first;
+    return at->second;
+  }
+  ssize_t size() const { return static_cast<ssize_t>(m_nodes.size()); }
+  typename std::map<K, N>::const_iterator begin() const { return m_nodes.begin(); }
+  typename std::map<K, N>::const_iterator end() const { return m_nodes.end(); }
 
-    DGNodeMap() {}
-    DGNodeMap(DGNodeMap const&) {}
-    DGNodeMap& operator=(DGNodeMap const&)
-    {
-        for (auto const& [key, node] : m_nodes) node.TryEvict(true);
-        return *this;
-    }
+  DGNodeMap() {}
+  DGNodeMap(DGNodeMap const&) {}
+  DGNodeMap& operator=(DGNodeMap const&) {
+    for (auto const& [key, node] : m_nodes) node.TryEvict(true);
+    return *this;
+  }
 
-private:
-    std::map<K, N> m_nodes;
+ private:
+  std::map<K, N> m_nodes;
 };
 
 template <typename N, typename K>
-void TryEvict(DGNodeMap<N, K> const& nodes)
-{
-    for (auto const& [key, node] : nodes) node.TryEvict(false);
+void TryEvict(DGNodeMap<N, K> const& nodes) {
+  for (auto const& [key, node] : nodes) node.TryEvict(false);
 }
 
 template <typename Base, typename N, typename C, typename K>
-class DGKeyed : public Base
-{
-public:
-    typedef K key_type;
-    typedef DGNodeMap<N, K> map_type;
-    typename Base::output_type const& read(C const* self)
-    {
-        _self = self;
-        return Base::read();
-    }
-    K const& _GetKey() const { return *m_key; }
+class DGKeyed : public Base {
+ public:
+  typedef K key_type;
+  typedef DGNodeMap<N, K> map_type;
+  typename Base::output_type const& read(C const* self) {
+    _self = self;
+    return Base::read();
+  }
+  K const& _GetKey() const { return *m_key; }
 
-    C const* _self = nullptr;
-    K const* m_key = nullptr;
+  C const* _self = nullptr;
+  K const* m_key = nullptr;
 };
 
 // --- Async: the calculation waits in a queue
 
-class DGAsyncNode : public DGNode
-{
-public:
-    enum EQueue
-    {
-        Calculation,
-        InputOutput
-    };
+class DGAsyncNode : public DGNode {
+ public:
+  enum EQueue { Calculation, InputOutput };
 
-    DGAsyncNode() {}
-    DGAsyncNode(DGAsyncNode const& rhs) : DGNode(rhs) {}
-    DGAsyncNode& operator=(DGAsyncNode const& rhs)
-    {
-        DGNode::operator=(rhs);
-        return *this;
-    }
-    ~DGAsyncNode() override
-    {
-        for (EQueue queue : {Calculation, InputOutput}) Queue(queue).remove(this);
-    }
+  DGAsyncNode() {}
+  DGAsyncNode(DGAsyncNode const& rhs) : DGNode(rhs) {}
+  DGAsyncNode& operator=(DGAsyncNode const& rhs) {
+    DGNode::operator=(rhs);
+    return *this;
+  }
+  ~DGAsyncNode() override {
+    for (EQueue queue : {Calculation, InputOutput}) Queue(queue).remove(this);
+  }
 
-    // Runs what waits now. Answers how many calculations ran.
-    static ssize_t Run(EQueue queue)
-    {
-        ssize_t count = 0;
-        for (std::list<DGAsyncNode const*>& waiting = Queue(queue); !waiting.empty(); ++count)
-        {
-            DGAsyncNode const* node = waiting.front();
-            waiting.pop_front();
-            CalculationScope detached(nullptr);
-            if (node->CalculateOutput()) node->InvalidateDependents(true);
-        }
-        return count;
+  // Runs what waits now. Answers how many calculations ran.
+  static ssize_t Run(EQueue queue) {
+    ssize_t count = 0;
+    for (std::list<DGAsyncNode const*>& waiting = Queue(queue); !waiting.empty(); ++count) {
+      DGAsyncNode const* node = waiting.front();
+      waiting.pop_front();
+      CalculationScope detached(nullptr);
+      if (node->CalculateOutput()) node->InvalidateDependents(true);
     }
-    bool IsWaiting() const
-    {
-        std::list<DGAsyncNode const*> const& waiting = Queue(OwnQueue());
-        return std::find(waiting.begin(), waiting.end(), this) != waiting.end();
-    }
+    return count;
+  }
+  bool IsWaiting() const {
+    std::list<DGAsyncNode const*> const& waiting = Queue(OwnQueue());
+    return std::find(waiting.begin(), waiting.end(), this) != waiting.end();
+  }
 
-protected:
-    virtual bool CalculateOutput() const = 0;  // whether it changed
-    void Enqueue() const
-    {
-        if (!IsWaiting()) Queue(OwnQueue()).push_back(this);
-    }
+ protected:
+  virtual bool CalculateOutput() const = 0;  // whether it changed
+  void Enqueue() const {
+    if (!IsWaiting()) Queue(OwnQueue()).push_back(this);
+  }
 
-private:
-    EQueue OwnQueue() const { return HasFlag(DF_ASYNC_IO) ? InputOutput : Calculation; }
-    static std::list<DGAsyncNode const*>& Queue(EQueue queue)
-    {
-        static std::list<DGAsyncNode const*>* const queues = new std::list<DGAsyncNode const*>[2];
-        return queues[queue];
-    }
+ private:
+  EQueue OwnQueue() const { return HasFlag(DF_ASYNC_IO) ? InputOutput : Calculation; }
+  static std::list<DGAsyncNode const*>& Queue(EQueue queue) {
+    static std::list<DGAsyncNode const*>* const queues = new std::list<DGAsyncNode const*>[2];
+    return queues[queue];
+  }
 };
 
 // Both queues until nothing waits.
-inline ssize_t RunAsyncCalculations()
-{
-    ssize_t count = 0;
-    for (ssize_t more = 1; more > 0; count += more)
-    {
-        more = DGAsyncNode::Run(DGAsyncNode::Calculation) + DGAsyncNode::Run(DGAsyncNode::InputOutput);
-    }
-    return count;
+inline ssize_t RunAsyncCalculations() {
+  ssize_t count = 0;
+  for (ssize_t more = 1; more > 0; count += more) {
+    more = DGAsyncNode::Run(DGAsyncNode::Calculation) + DGAsyncNode::Run(DGAsyncNode::InputOutput);
+  }
+  return count;
 }
 
 template <typename Base, typename O, typename Calculate>
-bool ReplaceOutput(Base const& node, Calculate calculate)
-{
-    O output = O();
-    calculate(output);
-    if (output == node._output) return false;
-    node._output = std::move(output);
-    return true;
+bool ReplaceOutput(Base const& node, Calculate calculate) {
+  O output = O();
+  calculate(output);
+  if (output == node._output) return false;
+  node._output = std::move(output);
+  return true;
 }
 
 // --- The six that generated text derives from
 
 template <typename N, typename C, typename O>
-class DGSyncDepNode : public DGCacheNode<DGDepNode, N, C, O>
-{
-};
+class DGSyncDepNode : public DGCacheNode<DGDepNode, N, C, O> {};
 
 template <typename N, typename C, typename K, typename O>
-class DGKeyedSyncDepNode : public DGKeyed<DGCacheNode<DGDepNode, N, C, O>, N, C, K>
-{
-};
+class DGKeyedSyncDepNode : public DGKeyed<DGCacheNode<DGDepNode, N, C, O>, N, C, K> {};
 
 // Without an input the calculation depends on nothing: it runs once, and again when the value was evicted.
 template <typename N, typename C, typename O>
-class DGAsyncIndepNode : public DGCacheNode<DGAsyncNode, N, C, O>
-{
-protected:
-    bool RecalcCache() const override
-    {
-        this->Enqueue();
-        return false;
-    }
-    bool CalculateOutput() const override
-    {
-        N const* node = static_cast<N const*>(this);
-        return ReplaceOutput<DGAsyncIndepNode, O>(*this, [&](O& output) { N::CalcOutput(node->_GetSelf(), output); });
-    }
+class DGAsyncIndepNode : public DGCacheNode<DGAsyncNode, N, C, O> {
+ protected:
+  bool RecalcCache() const override {
+    this->Enqueue();
+    return false;
+  }
+  bool CalculateOutput() const override {
+    N const* node = static_cast<N const*>(this);
+    return ReplaceOutput<DGAsyncIndepNode, O>(*this, [&](O& output) { N::CalcOutput(node->_GetSelf(), output); });
+  }
 };
 
 template <typename N, typename C, typename K, typename O>
-class DGKeyedAsyncIndepNode : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>, N, C, K>
-{
-protected:
-    bool RecalcCache() const override
-    {
-        this->Enqueue();
-        return false;
-    }
-    bool CalculateOutput() const override
-    {
-        return ReplaceOutput<DGKeyedAsyncIndepNode, O>(
-            *this, [&](O& output) { N::CalcOutput(this->_self, output, this->_GetKey()); });
-    }
+class DGKeyedAsyncIndepNode : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>, N, C, K> {
+ protected:
+  bool RecalcCache() const override {
+    this->Enqueue();
+    return false;
+  }
+  bool CalculateOutput() const override {
+    return ReplaceOutput<DGKeyedAsyncIndepNode, O>(
+        *this, [&](O& output) { N::CalcOutput(this->_self, output, this->_GetKey()); });
+  }
 };
 
 // With an input, taking the input is what depends on the graph. The calculation sees only the input.
 template <typename N, typename C, typename I, typename O>
-class DGAsyncNodeOnInput : public DGCacheNode<DGAsyncNode, N, C, O>
-{
-public:
-    typedef I input_type;
+class DGAsyncNodeOnInput : public DGCacheNode<DGAsyncNode, N, C, O> {
+ public:
+  typedef I input_type;
 
-protected:
-    bool RecalcCache() const override
-    {
-        m_input = I();
-        N::CalcInput(static_cast<N const*>(this)->_GetSelf(), m_input);
-        this->Enqueue();
-        return false;
-    }
-    bool CalculateOutput() const override
-    {
-        N const* node = static_cast<N const*>(this);
-        return ReplaceOutput<DGAsyncNodeOnInput, O>(
-            *this, [&](O& output) { N::CalcOutput(node->_GetSelf(), output, m_input); });
-    }
+ protected:
+  bool RecalcCache() const override {
+    m_input = I();
+    N::CalcInput(static_cast<N const*>(this)->_GetSelf(), m_input);
+    this->Enqueue();
+    return false;
+  }
+  bool CalculateOutput() const override {
+    N const* node = static_cast<N const*>(this);
+    return ReplaceOutput<DGAsyncNodeOnInput, O>(*this,
+                                                [&](O& output) { N::CalcOutput(node->_GetSelf(), output, m_input); });
+  }
 
-private:
-    mutable I m_input = I();
+ private:
+  mutable I m_input = I();
 };
 
 template <typename N, typename C, typename K, typename I, typename O>
-class DGKeyedAsyncNodeOnInput : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>, N, C, K>
-{
-public:
-    typedef I input_type;
+class DGKeyedAsyncNodeOnInput : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>, N, C, K> {
+ public:
+  typedef I input_type;
 
-protected:
-    bool RecalcCache() const override
-    {
-        m_input = I();
-        N::CalcInput(this->_self, m_input, this->_GetKey());
-        this->Enqueue();
-        return false;
-    }
-    bool CalculateOutput() const override
-    {
-        return ReplaceOutput<DGKeyedAsyncNodeOnInput, O>(
-            *this, [&](O& output) { N::CalcOutput(this->_self, output, this->_GetKey(), m_input); });
-    }
+ protected:
+  bool RecalcCache() const override {
+    m_input = I();
+    N::CalcInput(this->_self, m_input, this->_GetKey());
+    this->Enqueue();
+    return false;
+  }
+  bool CalculateOutput() const override {
+    return ReplaceOutput<DGKeyedAsyncNodeOnInput, O>(
+        *this, [&](O& output) { N::CalcOutput(this->_self, output, this->_GetKey(), m_input); });
+  }
 
-private:
-    mutable I m_input = I();
+ private:
+  mutable I m_input = I();
 };
 
 }  // namespace vesk

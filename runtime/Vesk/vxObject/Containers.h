@@ -11,217 +11,176 @@
 #include <stdexcept>
 #include <vector>
 
-namespace vesk
-{
+namespace vesk {
 
 template <typename T>
-class xvector : public std::vector<T>
-{
-public:
-    typedef std::vector<T> base;
-    using base::base;
-    using base::erase;
-    xvector() {}
-    xvector(base const& items) : base(items) {}
-    void erase(ssize_t first, ssize_t count)
-    {
-        base::erase(base::begin() + first, base::begin() + first + count);
-    }
+class xvector : public std::vector<T> {
+ public:
+  typedef std::vector<T> base;
+  using base::base;
+  using base::erase;
+  xvector() {}
+  xvector(base const& items) : base(items) {}
+  void erase(ssize_t first, ssize_t count) { base::erase(base::begin() + first, base::begin() + first + count); }
 };
 
 template <typename T>
-class xdeque : public std::deque<T>
-{
-public:
-    using std::deque<T>::deque;
+class xdeque : public std::deque<T> {
+ public:
+  using std::deque<T>::deque;
 };
 
 template <typename T>
-class xlist : public std::list<T>
-{
-public:
-    using std::list<T>::list;
+class xlist : public std::list<T> {
+ public:
+  using std::list<T>::list;
 };
 
 template <typename T>
-class xset : public std::set<T>
-{
-public:
-    using std::set<T>::set;
-    bool Insert(T const& key) { return this->insert(key).second; }
-    bool Delete(T const& key) { return this->erase(key) > 0; }
-    bool Contains(T const& key) const { return this->count(key) > 0; }
+class xset : public std::set<T> {
+ public:
+  using std::set<T>::set;
+  bool Insert(T const& key) { return this->insert(key).second; }
+  bool Delete(T const& key) { return this->erase(key) > 0; }
+  bool Contains(T const& key) const { return this->count(key) > 0; }
 };
 
 template <typename T>
-class xbag : public std::multiset<T>
-{
-public:
-    using std::multiset<T>::multiset;
+class xbag : public std::multiset<T> {
+ public:
+  using std::multiset<T>::multiset;
 };
 
 // A key that is not there: inserted by the non-const operator, std::out_of_range from the const one.
 template <typename K, typename V>
-class xmap : public std::map<K, V>
-{
-public:
-    typedef std::map<K, V> base;
-    using base::base;
-    V& operator[](K const& key) { return base::operator[](key); }
-    V const& operator[](K const& key) const { return this->at(key); }
+class xmap : public std::map<K, V> {
+ public:
+  typedef std::map<K, V> base;
+  using base::base;
+  V& operator[](K const& key) { return base::operator[](key); }
+  V const& operator[](K const& key) const { return this->at(key); }
 };
 
 template <typename T, ssize_t N>
-class Array
-{
-public:
-    Array() : m_items() {}
-    ssize_t size() const { return N; }
-    T& operator[](ssize_t i) { return m_items[i]; }
-    T const& operator[](ssize_t i) const { return m_items[i]; }
-    T* begin() { return m_items; }
-    T* end() { return m_items + N; }
-    T const* begin() const { return m_items; }
-    T const* end() const { return m_items + N; }
+class Array {
+ public:
+  Array() : m_items() {}
+  ssize_t size() const { return N; }
+  T& operator[](ssize_t i) { return m_items[i]; }
+  T const& operator[](ssize_t i) const { return m_items[i]; }
+  T* begin() { return m_items; }
+  T* end() { return m_items + N; }
+  T const* begin() const { return m_items; }
+  T const* end() const { return m_items + N; }
 
-private:
-    T m_items[N];
+ private:
+  T m_items[N];
 };
 
 // An array whose size is set at run time; it keeps its items when it is resized. (No std::vector: its bool has no
 // references.)
 template <typename T>
-class DynArray
-{
-public:
-    DynArray() {}
-    explicit DynArray(ssize_t size) { resize(size); }
-    DynArray(std::initializer_list<T> items) : DynArray(static_cast<ssize_t>(items.size()))
-    {
-        std::copy(items.begin(), items.end(), begin());
-    }
-    DynArray(DynArray const& rhs) : DynArray(rhs.m_size) { std::copy(rhs.begin(), rhs.end(), begin()); }
-    DynArray(DynArray&& rhs) : m_size(std::exchange(rhs.m_size, 0)), m_items(std::move(rhs.m_items)) {}
-    DynArray& operator=(DynArray rhs)
-    {
-        std::swap(m_size, rhs.m_size);
-        m_items.swap(rhs.m_items);
-        return *this;
-    }
-    void resize(ssize_t size)
-    {
-        std::unique_ptr<T[]> items(new T[size]());
-        std::move(begin(), begin() + std::min(size, m_size), items.get());
-        m_items.swap(items);
-        m_size = size;
-    }
-    ssize_t size() const { return m_size; }
-    T& operator[](ssize_t i) { return m_items[i]; }
-    T const& operator[](ssize_t i) const { return m_items[i]; }
-    T* begin() { return m_items.get(); }
-    T* end() { return m_items.get() + m_size; }
-    T const* begin() const { return m_items.get(); }
-    T const* end() const { return m_items.get() + m_size; }
+class DynArray {
+ public:
+  DynArray() {}
+  explicit DynArray(ssize_t size) { resize(size); }
+  DynArray(std::initializer_list<T> items) : DynArray(static_cast<ssize_t>(items.size())) {
+    std::copy(items.begin(), items.end(), begin());
+  }
+  DynArray(DynArray const& rhs) : DynArray(rhs.m_size) { std::copy(rhs.begin(), rhs.end(), begin()); }
+  DynArray(DynArray&& rhs) : m_size(std::exchange(rhs.m_size, 0)), m_items(std::move(rhs.m_items)) {}
+  DynArray& operator=(DynArray rhs) {
+    std::swap(m_size, rhs.m_size);
+    m_items.swap(rhs.m_items);
+    return *this;
+  }
+  void resize(ssize_t size) {
+    std::unique_ptr<T[]> items(new T[size]());
+    std::move(begin(), begin() + std::min(size, m_size), items.get());
+    m_items.swap(items);
+    m_size = size;
+  }
+  ssize_t size() const { return m_size; }
+  T& operator[](ssize_t i) { return m_items[i]; }
+  T const& operator[](ssize_t i) const { return m_items[i]; }
+  T* begin() { return m_items.get(); }
+  T* end() { return m_items.get() + m_size; }
+  T const* begin() const { return m_items.get(); }
+  T const* end() const { return m_items.get() + m_size; }
 
-private:
-    ssize_t m_size = 0;
-    std::unique_ptr<T[]> m_items;
+ private:
+  ssize_t m_size = 0;
+  std::unique_ptr<T[]> m_items;
 };
 
 // What the containers share: comparison of the two arrays, and printing of them all as [a,b,c].
 template <typename T, ssize_t N>
-bool operator==(Array<T, N> const& a, Array<T, N> const& b)
-{
-    return std::equal(a.begin(), a.end(), b.begin());
+bool operator==(Array<T, N> const& a, Array<T, N> const& b) {
+  return std::equal(a.begin(), a.end(), b.begin());
 }
 template <typename T, ssize_t N>
-bool operator!=(Array<T, N> const& a, Array<T, N> const& b)
-{
-    return !(a == b);
+bool operator!=(Array<T, N> const& a, Array<T, N> const& b) {
+  return !(a == b);
 }
 template <typename T, ssize_t N>
-bool operator<(Array<T, N> const& a, Array<T, N> const& b)
-{
-    return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
+bool operator<(Array<T, N> const& a, Array<T, N> const& b) {
+  return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
 }
 template <typename T>
-bool operator==(DynArray<T> const& a, DynArray<T> const& b)
-{
-    return std::equal(a.begin(), a.end(), b.begin(), b.end());
+bool operator==(DynArray<T> const& a, DynArray<T> const& b) {
+  return std::equal(a.begin(), a.end(), b.begin(), b.end());
 }
 template <typename T>
-bool operator!=(DynArray<T> const& a, DynArray<T> const& b)
-{
-    return !(a == b);
+bool operator!=(DynArray<T> const& a, DynArray<T> const& b) {
+  return !(a == b);
 }
 template <typename T>
-bool operator<(DynArray<T> const& a, DynArray<T> const& b)
-{
-    return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
+bool operator<(DynArray<T> const& a, DynArray<T> const& b) {
+  return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
 }
 
 template <typename T>
-struct ContainerTraits
-{
-    static const bool is_container = false;
+struct ContainerTraits {
+  static const bool is_container = false;
 };
 template <typename T, bool Grows, bool Keyed>
-struct ContainerTraitsOf
-{
-    static const bool is_container = true;
-    static const bool grows = Grows;   // by push_back
-    static const bool keyed = Keyed;   // elements are inserted
-    typedef T element_type;
+struct ContainerTraitsOf {
+  static const bool is_container = true;
+  static const bool grows = Grows;  // by push_back
+  static const bool keyed = Keyed;  // elements are inserted
+  typedef T element_type;
 };
 template <typename T>
-struct ContainerTraits<xvector<T>> : ContainerTraitsOf<T, true, false>
-{
-};
+struct ContainerTraits<xvector<T>> : ContainerTraitsOf<T, true, false> {};
 template <typename T>
-struct ContainerTraits<xdeque<T>> : ContainerTraitsOf<T, true, false>
-{
-};
+struct ContainerTraits<xdeque<T>> : ContainerTraitsOf<T, true, false> {};
 template <typename T>
-struct ContainerTraits<xlist<T>> : ContainerTraitsOf<T, true, false>
-{
-};
+struct ContainerTraits<xlist<T>> : ContainerTraitsOf<T, true, false> {};
 template <typename T>
-struct ContainerTraits<xset<T>> : ContainerTraitsOf<T, false, true>
-{
-};
+struct ContainerTraits<xset<T>> : ContainerTraitsOf<T, false, true> {};
 template <typename T>
-struct ContainerTraits<xbag<T>> : ContainerTraitsOf<T, false, true>
-{
-};
+struct ContainerTraits<xbag<T>> : ContainerTraitsOf<T, false, true> {};
 template <typename K, typename V>
-struct ContainerTraits<xmap<K, V>> : ContainerTraitsOf<std::pair<K, V>, false, true>
-{
-};
+struct ContainerTraits<xmap<K, V>> : ContainerTraitsOf<std::pair<K, V>, false, true> {};
 template <typename T>
-struct ContainerTraits<DynArray<T>> : ContainerTraitsOf<T, false, false>
-{
-};
+struct ContainerTraits<DynArray<T>> : ContainerTraitsOf<T, false, false> {};
 template <typename T, ssize_t N>
-struct ContainerTraits<Array<T, N>> : ContainerTraitsOf<T, false, false>
-{
-};
+struct ContainerTraits<Array<T, N>> : ContainerTraitsOf<T, false, false> {};
 
 template <typename T>
 constexpr bool IsContainer = ContainerTraits<T>::is_container;
 
 template <typename T, typename = std::enable_if_t<IsContainer<T>>>
-xostream& operator<<(xostream& os, T const& items)
-{
-    os.Write("[");
-    bool isFirst = true;
-    for (auto const& item : items)
-    {
-        if (!isFirst) os.Write(",");
-        isFirst = false;
-        os << item;
-    }
-    os.Write("]");
-    return os;
+xostream& operator<<(xostream& os, T const& items) {
+  os.Write("[");
+  bool isFirst = true;
+  for (auto const& item : items) {
+    if (!isFirst) os.Write(",");
+    isFirst = false;
+    os << item;
+  }
+  os.Write("]");
+  return os;
 }
 
 }  // namespace vesk

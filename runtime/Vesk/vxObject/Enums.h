@@ -3,8 +3,7 @@
 
 @import "Vesk/vxObject/Archive.h"
 
-namespace vesk
-{
+namespace vesk {
 
 template <typename N>
 using EnabledArrayOf = decltype(N::enabledArray());
@@ -12,56 +11,48 @@ template <typename N>
 using ValueArrayOf = decltype(N::valueArray());
 
 template <typename N>
-class EnumBase
-{
-public:
-    EnumBase(int value) : m_value(value) {}
-    operator int() const { return m_value; }
+class EnumBase {
+ public:
+  EnumBase(int value) : m_value(value) {}
+  operator int() const { return m_value; }
 
-    // The position of the value among the labels, -1 for a number without one.
-    ssize_t Index() const
-    {
-        for (ssize_t i = 0; i < N::LEN; ++i)
-        {
-            if (ValueAt(i) == m_value) return i;
-        }
-        return -1;
+  // The position of the value among the labels, -1 for a number without one.
+  ssize_t Index() const {
+    for (ssize_t i = 0; i < N::LEN; ++i) {
+      if (ValueAt(i) == m_value) return i;
     }
-    static int ValueAt(ssize_t index)
-    {
-        if constexpr (Detects<ValueArrayOf, N>) return N::valueArray()[index];
-        return static_cast<int>(index);
-    }
-    static bool IsEnabled(ssize_t index)
-    {
-        if constexpr (Detects<EnabledArrayOf, N>) return N::enabledArray()[index];
-        return true;
-    }
-    // Null for a number without a label.
-    ConstStringZ Label() const { return Index() < 0 ? nullptr : N::stringArray()[Index()]; }
+    return -1;
+  }
+  static int ValueAt(ssize_t index) {
+    if constexpr (Detects<ValueArrayOf, N>) return N::valueArray()[index];
+    return static_cast<int>(index);
+  }
+  static bool IsEnabled(ssize_t index) {
+    if constexpr (Detects<EnabledArrayOf, N>) return N::enabledArray()[index];
+    return true;
+  }
+  // Null for a number without a label.
+  ConstStringZ Label() const { return Index() < 0 ? nullptr : N::stringArray()[Index()]; }
 
-    void Serialise(Archive& ar) const { SerialiseVariableLengthUint(ar, static_cast<uint32>(m_value)); }
-    void Deserialise(InputArchive& ar)
-    {
-        uint32 value;
-        DeserialiseVariableLengthUint(ar, value);
-        m_value = static_cast<int32>(value);
-    }
-    friend xostream& operator<<(xostream& os, N const& value)
-    {
-        if (ConstStringZ label = value.Label()) return os << label;
-        return os << value.m_value;
-    }
+  void Serialise(Archive& ar) const { SerialiseVariableLengthUint(ar, static_cast<uint32>(m_value)); }
+  void Deserialise(InputArchive& ar) {
+    uint32 value;
+    DeserialiseVariableLengthUint(ar, value);
+    m_value = static_cast<int32>(value);
+  }
+  friend xostream& operator<<(xostream& os, N const& value) {
+    if (ConstStringZ label = value.Label()) return os << label;
+    return os << value.m_value;
+  }
 
-private:
-    int32 m_value;
+ private:
+  int32 m_value;
 };
 
 template <typename N>
-class EnumBaseForRefinedLabels : public EnumBase<N>
-{
-public:
-    EnumBaseForRefinedLabels(int value) : EnumBase<N>(value) {}
+class EnumBaseForRefinedLabels : public EnumBase<N> {
+ public:
+  EnumBaseForRefinedLabels(int value) : EnumBase<N>(value) {}
 };
 
 }  // namespace vesk

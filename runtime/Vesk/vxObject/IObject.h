@@ -1,5 +1,5 @@
-// The runtime that translated text is compiled against: import this file. It declares the two interfaces that everything
-// else builds on, and imports the library.
+// The runtime that translated text is compiled against: import this file. It declares the two interfaces that
+// everything else builds on, and imports the library.
 
 @import "Vesk/vxObject/Registry.h"
 

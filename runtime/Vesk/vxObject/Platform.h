@@ -22,8 +22,7 @@
 #define __stdcall
 #endif
 
-namespace vesk
-{
+namespace vesk {
 
 typedef std::int8_t int8;
 typedef std::int16_t int16;
@@ -49,15 +48,12 @@ typedef void (*FunctionPointer)();
 typedef int64 RSN;
 
 // The null of interface pointers, functors and barriers without an object.
-struct NullInterface
-{
-};
+struct NullInterface {};
 constexpr NullInterface null = {};
 
-[[noreturn]] inline void FailAssertion(ConstStringZ expression, ConstStringZ file, int line)
-{
-    std::cerr << file << "(" << line << ") : assertion failed : " << expression << std::endl;
-    std::abort();
+[[noreturn]] inline void FailAssertion(ConstStringZ expression, ConstStringZ file, int line) {
+  std::cerr << file << "(" << line << ") : assertion failed : " << expression << std::endl;
+  std::abort();
 }
 
 }  // namespace vesk
@@ -90,23 +86,21 @@ using vesk::uint8;
 
 // From `this` of a member (an attribute struct, a node) to the object that holds it. No offsetof: MEMBER may be a path.
 #define VX_MEMBER_OFFSET(CLS, MEMBER) \
-    (reinterpret_cast<char*>(&reinterpret_cast<CLS*>(0x10000)->MEMBER) - reinterpret_cast<char*>(0x10000))
-#define ATTRIB_CAST(CLS, MEMBER) \
-    (reinterpret_cast<CLS*>(reinterpret_cast<char*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
+  (reinterpret_cast<char*>(&reinterpret_cast<CLS*>(0x10000)->MEMBER) - reinterpret_cast<char*>(0x10000))
+#define ATTRIB_CAST(CLS, MEMBER) (reinterpret_cast<CLS*>(reinterpret_cast<char*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
 #define CONST_ATTRIB_CAST(CLS, MEMBER) \
-    (reinterpret_cast<CLS const*>(reinterpret_cast<char const*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
+  (reinterpret_cast<CLS const*>(reinterpret_cast<char const*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
 
 // The storage of a variant: as large as its largest item. The number in the name is that of the items.
-namespace vesk
-{
+namespace vesk {
 template <typename... Sizes>
-constexpr std::size_t MaxSize(Sizes... sizes)
-{
-    std::size_t most = 1;
-    ((most = static_cast<std::size_t>(sizes) > most ? static_cast<std::size_t>(sizes) : most), ...);
-    return most;
+constexpr std::size_t MaxSize(Sizes... sizes) {
+  std::size_t most = 1;
+  ((most = static_cast<std::size_t>(sizes) > most ? static_cast<std::size_t>(sizes) : most), ...);
+  return most;
 }
 }  // namespace vesk
+
 @scope
 {
     @let int items = 1

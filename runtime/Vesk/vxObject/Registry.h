@@ -4,43 +4,34 @@
 @import "Vesk/vxObject/ByteCode.h"
 @import "Vesk/vxObject/TypeOps.h"
 
-namespace vesk
-{
+namespace vesk {
 
 // A project at run time: vxDefineTarget (Model.h) makes it.
-struct XTarget
-{
-    ConstStringZ m_name;
-    RSN m_rsn;         // the release that it writes
-    RSN m_archiveRsn;  // the release of the archive being read
+struct XTarget {
+  ConstStringZ m_name;
+  RSN m_rsn;         // the release that it writes
+  RSN m_archiveRsn;  // the release of the archive being read
 };
 
-enum NSE
-{
-    NSE_OK,
-    NSE_ALREADY_DEFINED
+enum NSE { NSE_OK, NSE_ALREADY_DEFINED };
+
+template <typename R>
+struct RegisteredRecord {
+  R const* m_record;
+  XTarget* m_target;
 };
 
 template <typename R>
-struct RegisteredRecord
-{
-    R const* m_record;
-    XTarget* m_target;
-};
-
-template <typename R>
-std::map<std::string, RegisteredRecord<R>>& RecordTable()
-{
-    static std::map<std::string, RegisteredRecord<R>> table;
-    return table;
+std::map<std::string, RegisteredRecord<R>>& RecordTable() {
+  static std::map<std::string, RegisteredRecord<R>> table;
+  return table;
 }
 
 // The same record may be registered again; another one of its name is refused.
 template <typename R>
-NSE RegisterRecord(R const* record, XTarget* target)
-{
-    const auto [at, isNew] = RecordTable<R>().insert({record->m_name, {record, target}});
-    return isNew || at->second.m_record == record ? NSE_OK : NSE_ALREADY_DEFINED;
+NSE RegisterRecord(R const* record, XTarget* target) {
+  const auto [at, isNew] = RecordTable<R>().insert({record->m_name, {record, target}});
+  return isNew || at->second.m_record == record ? NSE_OK : NSE_ALREADY_DEFINED;
 }
 
 inline NSE RegisterReflectedClass(ReflectedClass const* r, XTarget* t) { return RegisterRecord(r, t); }
@@ -48,109 +39,97 @@ inline NSE RegisterReflectedInterface(ReflectedInterface const* r, XTarget* t) {
 inline NSE RegisterReflectedEnum(ReflectedEnum const* r, XTarget* t) { return RegisterRecord(r, t); }
 inline NSE RegisterReflectedVariant(ReflectedVariant const* r, XTarget* t) { return RegisterRecord(r, t); }
 inline NSE RegisterReflectedFunctor(ReflectedFunctor const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedGlobalFunction(ReflectedGlobalFunction const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedGlobalVariable(ReflectedGlobalVariable const* r, XTarget* t) { return RegisterRecord(r, t); }
+inline NSE RegisterReflectedGlobalFunction(ReflectedGlobalFunction const* r, XTarget* t) {
+  return RegisterRecord(r, t);
+}
+inline NSE RegisterReflectedGlobalVariable(ReflectedGlobalVariable const* r, XTarget* t) {
+  return RegisterRecord(r, t);
+}
 inline NSE RegisterReflectedTypedef(ReflectedTypedef const* r, XTarget* t) { return RegisterRecord(r, t); }
 
 // Find<ReflectedClass>("a::Name"), null when there is none. All<ReflectedClass>() lists them.
 template <typename R>
-R const* Find(std::string const& name)
-{
-    const auto at = RecordTable<R>().find(name);
-    return at == RecordTable<R>().end() ? nullptr : at->second.m_record;
+R const* Find(std::string const& name) {
+  const auto at = RecordTable<R>().find(name);
+  return at == RecordTable<R>().end() ? nullptr : at->second.m_record;
 }
 
 template <typename R>
-xvector<R const*> All()
-{
-    xvector<R const*> records;
-    for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.m_record);
-    return records;
+xvector<R const*> All() {
+  xvector<R const*> records;
+  for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.m_record);
+  return records;
 }
 
 template <typename R>
-XTarget* TargetOf(R const& record)
-{
-    const auto at = RecordTable<R>().find(record.m_name);
-    return at == RecordTable<R>().end() ? nullptr : at->second.m_target;
+XTarget* TargetOf(R const& record) {
+  const auto at = RecordTable<R>().find(record.m_name);
+  return at == RecordTable<R>().end() ? nullptr : at->second.m_target;
 }
 
 // --- Types
 
-inline std::map<xstring, TypeOps const*>& TypeOpsTable()
-{
-    static std::map<xstring, TypeOps const*> table = {
-        {"bool", &MakeTypeOps<bool>()},       {"int8", &MakeTypeOps<int8>()},       {"int16", &MakeTypeOps<int16>()},
-        {"int32", &MakeTypeOps<int32>()},     {"int64", &MakeTypeOps<int64>()},     {"int128", &MakeTypeOps<int128>()},
-        {"uint8", &MakeTypeOps<uint8>()},     {"uint16", &MakeTypeOps<uint16>()},   {"uint32", &MakeTypeOps<uint32>()},
-        {"uint64", &MakeTypeOps<uint64>()},   {"uint128", &MakeTypeOps<uint128>()}, {"float32", &MakeTypeOps<float32>()},
-        {"float64", &MakeTypeOps<float64>()}, {"char8", &MakeTypeOps<char8>()},     {"char16", &MakeTypeOps<char16>()},
-        {"string8", &MakeTypeOps<string8>()}, {"string16", &MakeTypeOps<string16>()}};
-    return table;
+inline std::map<xstring, TypeOps const*>& TypeOpsTable() {
+  static std::map<xstring, TypeOps const*> table = {
+      {"bool", &MakeTypeOps<bool>()},       {"int8", &MakeTypeOps<int8>()},        {"int16", &MakeTypeOps<int16>()},
+      {"int32", &MakeTypeOps<int32>()},     {"int64", &MakeTypeOps<int64>()},      {"int128", &MakeTypeOps<int128>()},
+      {"uint8", &MakeTypeOps<uint8>()},     {"uint16", &MakeTypeOps<uint16>()},    {"uint32", &MakeTypeOps<uint32>()},
+      {"uint64", &MakeTypeOps<uint64>()},   {"uint128", &MakeTypeOps<uint128>()},  {"float32", &MakeTypeOps<float32>()},
+      {"float64", &MakeTypeOps<float64>()}, {"char8", &MakeTypeOps<char8>()},      {"char16", &MakeTypeOps<char16>()},
+      {"string8", &MakeTypeOps<string8>()}, {"string16", &MakeTypeOps<string16>()}};
+  return table;
 }
 
-inline NSE RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops)
-{
-    TypeOpsTable().insert({type.m_text, ops});
-    return NSE_OK;
+inline NSE RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops) {
+  TypeOpsTable().insert({type.m_text, ops});
+  return NSE_OK;
 }
 
 // Null when nobody registered the type. Decorators, metadata and typedefs are looked through.
-inline TypeOps const* FindTypeOps(ReflectedType const& type)
-{
-    if (type.m_code >= RC_VOLATILE && type.m_code <= RC_OFFSETTABLE) return FindTypeOps(type.m_inner.front());
-    if (type.m_code == RC_CLASS)
-    {
-        ReflectedClass const* record = Find<ReflectedClass>(type.m_name);
-        return record ? &record->m_ops : nullptr;
-    }
-    if (type.m_code == RC_VARIANT)
-    {
-        ReflectedVariant const* record = Find<ReflectedVariant>(type.m_name);
-        return record ? &record->m_ops : nullptr;
-    }
-    if (type.m_code == RC_ENUM) return &MakeTypeOps<int32>();
-    if (type.m_code == RC_TYPEDEF)
-    {
-        ReflectedTypedef const* record = Find<ReflectedTypedef>(type.m_name);
-        return record ? FindTypeOps(DecodeType({record->m_type, record->m_strings})) : nullptr;
-    }
-    ReflectedType plain = type;
-    plain.m_metadata.clear();
-    const auto at = TypeOpsTable().find(vxMakeString(plain));
-    return at == TypeOpsTable().end() ? nullptr : at->second;
+inline TypeOps const* FindTypeOps(ReflectedType const& type) {
+  if (type.m_code >= RC_VOLATILE && type.m_code <= RC_OFFSETTABLE) return FindTypeOps(type.m_inner.front());
+  if (type.m_code == RC_CLASS) {
+    ReflectedClass const* record = Find<ReflectedClass>(type.m_name);
+    return record ? &record->m_ops : nullptr;
+  }
+  if (type.m_code == RC_VARIANT) {
+    ReflectedVariant const* record = Find<ReflectedVariant>(type.m_name);
+    return record ? &record->m_ops : nullptr;
+  }
+  if (type.m_code == RC_ENUM) return &MakeTypeOps<int32>();
+  if (type.m_code == RC_TYPEDEF) {
+    ReflectedTypedef const* record = Find<ReflectedTypedef>(type.m_name);
+    return record ? FindTypeOps(DecodeType({record->m_type, record->m_strings})) : nullptr;
+  }
+  ReflectedType plain = type;
+  plain.m_metadata.clear();
+  const auto at = TypeOpsTable().find(vxMakeString(plain));
+  return at == TypeOpsTable().end() ? nullptr : at->second;
 }
 
 inline TypeOps const* FindTypeOps(ReflectionByteCode code) { return FindTypeOps(DecodeType(code)); }
 
 // Prints a value known only by its type: an enumeration by its label, the items of containers one by one, "?" when the
 // type is not registered.
-inline void PrintValue(xostream& os, ReflectedType const& type, void const* value)
-{
-    if (type.m_code == RC_ENUM)
-    {
-        const int32 number = *static_cast<int32 const*>(value);
-        if (ReflectedEnum const* record = Find<ReflectedEnum>(type.m_name))
-        {
-            for (ssize_t i = 0; i < record->m_numLabels; ++i)
-            {
-                if ((record->m_values ? record->m_values[i] : i) != number) continue;
-                os << record->m_labels[i];
-                return;
-            }
-        }
-        os << number;
+inline void PrintValue(xostream& os, ReflectedType const& type, void const* value) {
+  if (type.m_code == RC_ENUM) {
+    const int32 number = *static_cast<int32 const*>(value);
+    if (ReflectedEnum const* record = Find<ReflectedEnum>(type.m_name)) {
+      for (ssize_t i = 0; i < record->m_numLabels; ++i) {
+        if ((record->m_values ? record->m_values[i] : i) != number) continue;
+        os << record->m_labels[i];
         return;
+      }
     }
-    TypeOps const* ops = FindTypeOps(type);
-    if (ops && ops->m_print)
-    {
-        ops->m_print(os, value);
-    }
-    else
-    {
-        os << '?';
-    }
+    os << number;
+    return;
+  }
+  TypeOps const* ops = FindTypeOps(type);
+  if (ops && ops->m_print) {
+    ops->m_print(os, value);
+  } else {
+    os << '?';
+  }
 }
 
 }  // namespace vesk

@@ -1,5 +1,5 @@
-// Strings, and the stream that generated text prints to: std::ostream with an indentation, and an overload set of its own
-// so that every reflected type prints, containers included. Numbers of 8 bits print as numbers, bool as a word.
+// Strings, and the stream that generated text prints to: std::ostream with an indentation, and an overload set of its
+// own so that every reflected type prints, containers included. Numbers of 8 bits print as numbers, bool as a word.
 
 @import "Vesk/vxObject/Platform.h"
 
@@ -7,214 +7,179 @@
 #include <string>
 #include <string_view>
 
-namespace vesk
-{
+namespace vesk {
 
 template <typename C>
-class basic_xstring : public std::basic_string<C>
-{
-public:
-    typedef std::basic_string<C> base;
-    using base::base;
-    basic_xstring() {}
-    basic_xstring(base const& text) : base(text) {}
-    basic_xstring(base&& text) : base(std::move(text)) {}
+class basic_xstring : public std::basic_string<C> {
+ public:
+  typedef std::basic_string<C> base;
+  using base::base;
+  basic_xstring() {}
+  basic_xstring(base const& text) : base(text) {}
+  basic_xstring(base&& text) : base(std::move(text)) {}
 };
 typedef basic_xstring<char8> string8;
 typedef basic_xstring<char16> string16;
 typedef string8 xstring;
 
-class xostream
-{
-public:
-    explicit xostream(std::ostream& target) : m_target(target) {}
+class xostream {
+ public:
+  explicit xostream(std::ostream& target) : m_target(target) {}
 
-    void Write(std::string_view text)
-    {
-        while (!text.empty())
-        {
-            const std::size_t end = text.find('\n');
-            const std::string_view line = text.substr(0, end);
-            if (m_atLineStart && !line.empty()) m_target << std::string(m_indent, ' ');
-            m_target << line;
-            m_atLineStart = m_atLineStart && line.empty();
-            if (end == std::string_view::npos) return;
-            m_target << '\n';
-            m_atLineStart = true;
-            text.remove_prefix(end + 1);
-        }
+  void Write(std::string_view text) {
+    while (!text.empty()) {
+      const std::size_t end = text.find('\n');
+      const std::string_view line = text.substr(0, end);
+      if (m_atLineStart && !line.empty()) m_target << std::string(m_indent, ' ');
+      m_target << line;
+      m_atLineStart = m_atLineStart && line.empty();
+      if (end == std::string_view::npos) return;
+      m_target << '\n';
+      m_atLineStart = true;
+      text.remove_prefix(end + 1);
     }
+  }
 
-    void ChangeIndent(int by) { m_indent += by; }
-    std::ostream& Target() { return m_target; }
+  void ChangeIndent(int by) { m_indent += by; }
+  std::ostream& Target() { return m_target; }
 
-private:
-    std::ostream& m_target;
-    int m_indent = 0;
-    bool m_atLineStart = true;
+ private:
+  std::ostream& m_target;
+  int m_indent = 0;
+  bool m_atLineStart = true;
 };
 
 // Lines written while it lives are indented and stand in braces.
-class ScopeWriter2
-{
-public:
-    explicit ScopeWriter2(xostream& os) : m_os(os)
-    {
-        m_os.Write("{\n");
-        m_os.ChangeIndent(4);
-    }
-    ~ScopeWriter2()
-    {
-        m_os.ChangeIndent(-4);
-        m_os.Write("}\n");
-    }
-    ScopeWriter2(ScopeWriter2 const&) = delete;
-    void operator=(ScopeWriter2 const&) = delete;
+class ScopeWriter2 {
+ public:
+  explicit ScopeWriter2(xostream& os) : m_os(os) {
+    m_os.Write("{\n");
+    m_os.ChangeIndent(4);
+  }
+  ~ScopeWriter2() {
+    m_os.ChangeIndent(-4);
+    m_os.Write("}\n");
+  }
+  ScopeWriter2(ScopeWriter2 const&) = delete;
+  void operator=(ScopeWriter2 const&) = delete;
 
-private:
-    xostream& m_os;
+ private:
+  xostream& m_os;
 };
 
 // The standard output.
-inline xostream& xout()
-{
-    static xostream os(std::cout);
-    return os;
+inline xostream& xout() {
+  static xostream os(std::cout);
+  return os;
 }
 
-inline void AppendUtf8(std::string& text, uint32 c)
-{
-    if (c < 0x80)
-    {
-        text += static_cast<char>(c);
-        return;
-    }
-    const int more = c < 0x800 ? 1 : c < 0x10000 ? 2 : 3;
-    text += static_cast<char>((0xF00 >> more & 0xFF) | c >> 6 * more);
-    for (int i = more - 1; i >= 0; --i) text += static_cast<char>(0x80 | (c >> 6 * i & 0x3F));
+inline void AppendUtf8(std::string& text, uint32 c) {
+  if (c < 0x80) {
+    text += static_cast<char>(c);
+    return;
+  }
+  const int more = c < 0x800 ? 1 : c < 0x10000 ? 2 : 3;
+  text += static_cast<char>((0xF00 >> more & 0xFF) | c >> 6 * more);
+  for (int i = more - 1; i >= 0; --i) text += static_cast<char>(0x80 | (c >> 6 * i & 0x3F));
 }
 
-inline std::string Utf8Text(std::u16string_view units)
-{
-    std::string text;
-    for (std::size_t i = 0; i < units.size(); ++i)
-    {
-        uint32 c = units[i];
-        const bool isPair = (c & 0xFC00) == 0xD800 && i + 1 < units.size() && (units[i + 1] & 0xFC00) == 0xDC00;
-        if (isPair) c = 0x10000 + ((c & 0x3FF) << 10) + (units[++i] & 0x3FF);
-        AppendUtf8(text, c);
-    }
-    return text;
+inline std::string Utf8Text(std::u16string_view units) {
+  std::string text;
+  for (std::size_t i = 0; i < units.size(); ++i) {
+    uint32 c = units[i];
+    const bool isPair = (c & 0xFC00) == 0xD800 && i + 1 < units.size() && (units[i + 1] & 0xFC00) == 0xDC00;
+    if (isPair) c = 0x10000 + ((c & 0x3FF) << 10) + (units[++i] & 0x3FF);
+    AppendUtf8(text, c);
+  }
+  return text;
 }
 
-inline std::string DecimalText(uint128 value)
-{
-    std::string digits;
-    do digits.insert(digits.begin(), static_cast<char>('0' + static_cast<int>(value % 10)));
-    while (value /= 10);
-    return digits;
+inline std::string DecimalText(uint128 value) {
+  std::string digits;
+  do digits.insert(digits.begin(), static_cast<char>('0' + static_cast<int>(value % 10)));
+  while (value /= 10);
+  return digits;
 }
 
 template <typename T>
-constexpr bool IsArithmetic = std::is_arithmetic<T>::value || std::is_same<T, int128>::value || std::is_same<T, uint128>::value;
+constexpr bool IsArithmetic =
+    std::is_arithmetic<T>::value || std::is_same<T, int128>::value || std::is_same<T, uint128>::value;
 
 template <typename T, typename = std::enable_if_t<IsArithmetic<T>>>
-xostream& operator<<(xostream& os, T value)
-{
-    if constexpr (std::is_same<T, bool>::value)
-    {
-        os.Write(value ? "true" : "false");
-    }
-    else if constexpr (std::is_same<T, char8>::value)
-    {
-        os.Write(std::string_view(&value, 1));
-    }
-    else if constexpr (std::is_same<T, char16>::value)
-    {
-        os.Write(Utf8Text(std::u16string_view(&value, 1)));
-    }
-    else if constexpr (sizeof(T) == 16 && !std::is_floating_point<T>::value)
-    {
-        const bool isNegative = value < 0;
-        os.Write((isNegative ? "-" : "") + DecimalText(isNegative ? -static_cast<uint128>(value) : static_cast<uint128>(value)));
-    }
-    else
-    {
-        std::ostringstream text;
-        text << +value;
-        os.Write(text.str());
-    }
-    return os;
+xostream& operator<<(xostream& os, T value) {
+  if constexpr (std::is_same<T, bool>::value) {
+    os.Write(value ? "true" : "false");
+  } else if constexpr (std::is_same<T, char8>::value) {
+    os.Write(std::string_view(&value, 1));
+  } else if constexpr (std::is_same<T, char16>::value) {
+    os.Write(Utf8Text(std::u16string_view(&value, 1)));
+  } else if constexpr (sizeof(T) == 16 && !std::is_floating_point<T>::value) {
+    const bool isNegative = value < 0;
+    os.Write((isNegative ? "-" : "") +
+             DecimalText(isNegative ? -static_cast<uint128>(value) : static_cast<uint128>(value)));
+  } else {
+    std::ostringstream text;
+    text << +value;
+    os.Write(text.str());
+  }
+  return os;
 }
 
-inline xostream& operator<<(xostream& os, std::string_view text)
-{
-    os.Write(text);
-    return os;
+inline xostream& operator<<(xostream& os, std::string_view text) {
+  os.Write(text);
+  return os;
 }
-inline xostream& operator<<(xostream& os, ConstStringZ text)
-{
-    os.Write(text ? text : "(null)");
-    return os;
+inline xostream& operator<<(xostream& os, ConstStringZ text) {
+  os.Write(text ? text : "(null)");
+  return os;
 }
-inline xostream& operator<<(xostream& os, string8 const& text)
-{
-    os.Write(text);
-    return os;
+inline xostream& operator<<(xostream& os, string8 const& text) {
+  os.Write(text);
+  return os;
 }
-inline xostream& operator<<(xostream& os, std::string const& text)
-{
-    os.Write(text);
-    return os;
+inline xostream& operator<<(xostream& os, std::string const& text) {
+  os.Write(text);
+  return os;
 }
-inline xostream& operator<<(xostream& os, string16 const& text)
-{
-    os.Write(Utf8Text(text));
-    return os;
+inline xostream& operator<<(xostream& os, string16 const& text) {
+  os.Write(Utf8Text(text));
+  return os;
 }
 
 template <typename T, typename = std::enable_if_t<std::is_enum<T>::value>, typename = void>
-xostream& operator<<(xostream& os, T value)
-{
-    return os << static_cast<std::underlying_type_t<T>>(value);
+xostream& operator<<(xostream& os, T value) {
+  return os << static_cast<std::underlying_type_t<T>>(value);
 }
 
 template <typename T>
-xostream& operator<<(xostream& os, T* address)
-{
-    std::ostringstream text;
-    if constexpr (std::is_function<T>::value)
-    {
-        text << reinterpret_cast<void*>(address);
-    }
-    else
-    {
-        text << static_cast<void const*>(address);
-    }
-    os.Write(text.str());
-    return os;
+xostream& operator<<(xostream& os, T* address) {
+  std::ostringstream text;
+  if constexpr (std::is_function<T>::value) {
+    text << reinterpret_cast<void*>(address);
+  } else {
+    text << static_cast<void const*>(address);
+  }
+  os.Write(text.str());
+  return os;
 }
 
 template <typename A, typename B>
-xostream& operator<<(xostream& os, std::pair<A, B> const& pair)
-{
-    return os << '(' << pair.first << ',' << pair.second << ')';
+xostream& operator<<(xostream& os, std::pair<A, B> const& pair) {
+  return os << '(' << pair.first << ',' << pair.second << ')';
 }
 
 // Fields of models and nodes of the dependency graph print what they read.
 template <typename T, typename Value = decltype(std::declval<T const&>().read())>
-auto operator<<(xostream& os, T const& field) -> decltype(os << std::declval<Value>())
-{
-    return os << field.read();
+auto operator<<(xostream& os, T const& field) -> decltype(os << std::declval<Value>()) {
+  return os << field.read();
 }
 
 template <typename Print>
-xstring TextOf(Print print)
-{
-    std::ostringstream text;
-    xostream os(text);
-    print(os);
-    return text.str();
+xstring TextOf(Print print) {
+  std::ostringstream text;
+  xostream os(text);
+  print(os);
+  return text.str();
 }
 
 }  // namespace vesk

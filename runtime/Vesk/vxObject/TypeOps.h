@@ -1,11 +1,10 @@
-// The functions that fill a TypeOps, and the tables of the types that have no record of their own. What a type cannot do
-// (compare, print, be archived) its functions refuse at run time, so that a table can be made of any type.
+// The functions that fill a TypeOps, and the tables of the types that have no record of their own. What a type cannot
+// do (compare, print, be archived) its functions refuse at run time, so that a table can be made of any type.
 
 @import "Vesk/vxObject/Archive.h"
 @import "Vesk/vxObject/Visitors.h"
 
-namespace vesk
-{
+namespace vesk {
 
 template <typename T>
 using EqualExpression = decltype(std::declval<T const&>() == std::declval<T const&>());
@@ -15,130 +14,107 @@ template <typename T>
 using PrintExpression = decltype(std::declval<xostream&>() << std::declval<T const&>());
 
 template <typename T>
-bool VariableEqual(T const* a, T const* b)
-{
-    if constexpr (Detects<EqualExpression, T>) return *a == *b;
-    return a == b;
+bool VariableEqual(T const* a, T const* b) {
+  if constexpr (Detects<EqualExpression, T>) return *a == *b;
+  return a == b;
 }
 
 template <typename T>
-bool VariableLess(T const* a, T const* b)
-{
-    if constexpr (Detects<LessExpression, T>) return *a < *b;
-    return a < b;
+bool VariableLess(T const* a, T const* b) {
+  if constexpr (Detects<LessExpression, T>) return *a < *b;
+  return a < b;
 }
 
 template <typename T>
-void PrintVariable(xostream& os, T const* x)
-{
-    if constexpr (Detects<PrintExpression, T>)
-    {
-        os << *x;
-    }
-    else
-    {
-        os << "?";
-    }
+void PrintVariable(xostream& os, T const* x) {
+  if constexpr (Detects<PrintExpression, T>) {
+    os << *x;
+  } else {
+    os << "?";
+  }
 }
 
 template <typename T>
-void ConstructArray(T* array, ssize_t begin, ssize_t end)
-{
-    for (ssize_t i = begin; i < end; ++i) new (array + i) T();
+void ConstructArray(T* array, ssize_t begin, ssize_t end) {
+  for (ssize_t i = begin; i < end; ++i) new (array + i) T();
 }
 
 template <typename T>
-void CopyConstructArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end)
-{
-    for (ssize_t i = begin; i < end; ++i) new (array + at++) T(source[i]);
+void CopyConstructArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
+  for (ssize_t i = begin; i < end; ++i) new (array + at++) T(source[i]);
 }
 
 template <typename T>
-void AssignArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end)
-{
-    for (ssize_t i = begin; i < end; ++i) array[at++] = source[i];
+void AssignArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
+  for (ssize_t i = begin; i < end; ++i) array[at++] = source[i];
 }
 
 template <typename T>
-void DestructArray(T* array, ssize_t begin, ssize_t end)
-{
-    for (ssize_t i = begin; i < end; ++i) array[i].~T();
+void DestructArray(T* array, ssize_t begin, ssize_t end) {
+  for (ssize_t i = begin; i < end; ++i) array[i].~T();
 }
 
 template <typename T>
 constexpr bool IsSerialisable = std::is_enum<T>::value || Detects<SerialiseMember, T> || Detects<SerialiseFunction, T>;
 
 template <typename T>
-void SerialiseArray(Archive& ar, T const* array, ssize_t begin, ssize_t end)
-{
-    if constexpr (IsSerialisable<T>)
-    {
-        for (ssize_t i = begin; i < end; ++i) ar << array[i];
-    }
-    else
-    {
-        throw ArchiveError("type cannot be archived");
-    }
+void SerialiseArray(Archive& ar, T const* array, ssize_t begin, ssize_t end) {
+  if constexpr (IsSerialisable<T>) {
+    for (ssize_t i = begin; i < end; ++i) ar << array[i];
+  } else {
+    throw ArchiveError("type cannot be archived");
+  }
 }
 
 template <typename T>
-void DeserialiseArray(InputArchive& ar, T* array, ssize_t begin, ssize_t end)
-{
-    if constexpr (IsSerialisable<T>)
-    {
-        for (ssize_t i = begin; i < end; ++i) ar >> array[i];
-    }
-    else
-    {
-        throw ArchiveError("type cannot be archived");
-    }
+void DeserialiseArray(InputArchive& ar, T* array, ssize_t begin, ssize_t end) {
+  if constexpr (IsSerialisable<T>) {
+    for (ssize_t i = begin; i < end; ++i) ar >> array[i];
+  } else {
+    throw ArchiveError("type cannot be archived");
+  }
 }
 
 template <typename T>
-void VisitObjectsInArray(IObjectVisitor& v, T const* array, ssize_t begin, ssize_t end)
-{
-    for (ssize_t i = begin; i < end; ++i) v << array[i];
+void VisitObjectsInArray(IObjectVisitor& v, T const* array, ssize_t begin, ssize_t end) {
+  for (ssize_t i = begin; i < end; ++i) v << array[i];
 }
 
 template <typename T>
-void VisitPrefsInArray(IPrefVisitor& v, T const* array, ssize_t begin, ssize_t end)
-{
-    for (ssize_t i = begin; i < end; ++i) v << array[i];
+void VisitPrefsInArray(IPrefVisitor& v, T const* array, ssize_t begin, ssize_t end) {
+  for (ssize_t i = begin; i < end; ++i) v << array[i];
 }
 
 template <typename T>
-ssize_t BinaryLowerBound(T const* array, ssize_t begin, ssize_t end, T const* key)
-{
-    auto less = [](T const& a, T const& b) { return VariableLess(&a, &b); };
-    return std::lower_bound(array + begin, array + end, *key, less) - array;
+ssize_t BinaryLowerBound(T const* array, ssize_t begin, ssize_t end, T const* key) {
+  auto less = [](T const& a, T const& b) { return VariableLess(&a, &b); };
+  return std::lower_bound(array + begin, array + end, *key, less) - array;
 }
 
 template <typename T>
-ssize_t BinaryUpperBound(T const* array, ssize_t begin, ssize_t end, T const* key)
-{
-    auto less = [](T const& a, T const& b) { return VariableLess(&a, &b); };
-    return std::upper_bound(array + begin, array + end, *key, less) - array;
+ssize_t BinaryUpperBound(T const* array, ssize_t begin, ssize_t end, T const* key) {
+  auto less = [](T const& a, T const& b) { return VariableLess(&a, &b); };
+  return std::upper_bound(array + begin, array + end, *key, less) - array;
 }
 
 template <typename T>
-TypeOps const& MakeTypeOps()
-{
-    static const TypeOps ops = {
-        sizeof(T),
-        (CompareVariableFn)(bool (*)(T const*, T const*)) VariableEqual<T>,
-        (CompareVariableFn)(bool (*)(T const*, T const*)) VariableLess<T>,
-        (PrintVariableFn)(void (*)(xostream&, T const*)) PrintVariable<T>,
-        (ConstructArrayFn)(void (*)(T*, ssize_t, ssize_t)) ConstructArray<T>,
-        (CopyConstructArrayFn)(void (*)(T*, ssize_t, T const*, ssize_t, ssize_t)) CopyConstructArray<T>,
-        (AssignArrayFn)(void (*)(T*, ssize_t, T const*, ssize_t, ssize_t)) AssignArray<T>,
-        (DestructArrayFn)(void (*)(T*, ssize_t, ssize_t)) DestructArray<T>,
-        (SerialiseArrayFn)(void (*)(Archive&, T const*, ssize_t, ssize_t)) SerialiseArray<T>,
-        (DeserialiseArrayFn)(void (*)(InputArchive&, T*, ssize_t, ssize_t)) DeserialiseArray<T>,
-        (VisitObjectsInArrayFn)(void (*)(IObjectVisitor&, T const*, ssize_t, ssize_t)) VisitObjectsInArray<T>,
-        (VisitPrefsInArrayFn)(void (*)(IPrefVisitor&, T const*, ssize_t, ssize_t)) VisitPrefsInArray<T>,
-        (FindInArrayFn)(ssize_t(*)(T const*, ssize_t, ssize_t, T const*)) BinaryLowerBound<T>,
-        (FindInArrayFn)(ssize_t(*)(T const*, ssize_t, ssize_t, T const*)) BinaryUpperBound<T>};
-    return ops;
+TypeOps const& MakeTypeOps() {
+  static const TypeOps ops = {
+      sizeof(T),
+      (CompareVariableFn)(bool (*)(T const*, T const*))VariableEqual<T>,
+      (CompareVariableFn)(bool (*)(T const*, T const*))VariableLess<T>,
+      (PrintVariableFn)(void (*)(xostream&, T const*))PrintVariable<T>,
+      (ConstructArrayFn)(void (*)(T*, ssize_t, ssize_t))ConstructArray<T>,
+      (CopyConstructArrayFn)(void (*)(T*, ssize_t, T const*, ssize_t, ssize_t))CopyConstructArray<T>,
+      (AssignArrayFn)(void (*)(T*, ssize_t, T const*, ssize_t, ssize_t))AssignArray<T>,
+      (DestructArrayFn)(void (*)(T*, ssize_t, ssize_t))DestructArray<T>,
+      (SerialiseArrayFn)(void (*)(Archive&, T const*, ssize_t, ssize_t))SerialiseArray<T>,
+      (DeserialiseArrayFn)(void (*)(InputArchive&, T*, ssize_t, ssize_t))DeserialiseArray<T>,
+      (VisitObjectsInArrayFn)(void (*)(IObjectVisitor&, T const*, ssize_t, ssize_t))VisitObjectsInArray<T>,
+      (VisitPrefsInArrayFn)(void (*)(IPrefVisitor&, T const*, ssize_t, ssize_t))VisitPrefsInArray<T>,
+      (FindInArrayFn)(ssize_t(*)(T const*, ssize_t, ssize_t, T const*))BinaryLowerBound<T>,
+      (FindInArrayFn)(ssize_t(*)(T const*, ssize_t, ssize_t, T const*))BinaryUpperBound<T>};
+  return ops;
 }
 
 template <typename T>
@@ -146,16 +122,12 @@ using GetTypeOpsFunction = decltype(_GetTypeOps(std::declval<T const*>()));
 
 // The table of a type: of its record or of `$type` where the type's name space has it, else one made here.
 template <typename T>
-TypeOps const& GetTypeOps()
-{
-    if constexpr (Detects<GetTypeOpsFunction, T>)
-    {
-        return _GetTypeOps(static_cast<T const*>(nullptr));
-    }
-    else
-    {
-        return MakeTypeOps<T>();
-    }
+TypeOps const& GetTypeOps() {
+  if constexpr (Detects<GetTypeOpsFunction, T>) {
+    return _GetTypeOps(static_cast<T const*>(nullptr));
+  } else {
+    return MakeTypeOps<T>();
+  }
 }
 
 }  // namespace vesk

@@ -1,23 +1,22 @@
 // Visitors over the objects that a value refers to, and over its persistent references. `v << x` works for every type:
-// containers are walked, pointers and references are reported, classes visit their own members, anything else is silent.
+// containers are walked, pointers and references are reported, classes visit their own members, anything else is
+// silent.
 
 @import "Vesk/vxObject/Handles.h"
 
-namespace vesk
-{
+namespace vesk {
 
-// Is told each object that a pointer, ptr, pref or cref leads to. The object is not entered: call its VisitObjects to go on.
-struct IObjectVisitor
-{
-    virtual ~IObjectVisitor() {}
-    virtual void VisitObject(ptr<IObject> const& object) = 0;
+// Is told each object that a pointer, ptr, pref or cref leads to. The object is not entered: call its VisitObjects to
+// go on.
+struct IObjectVisitor {
+  virtual ~IObjectVisitor() {}
+  virtual void VisitObject(ptr<IObject> const& object) = 0;
 };
 
 // Is told each pref and cref, null ones included.
-struct IPrefVisitor
-{
-    virtual ~IPrefVisitor() {}
-    virtual void VisitPref(PersistentReference const& reference) = 0;
+struct IPrefVisitor {
+  virtual ~IPrefVisitor() {}
+  virtual void VisitPref(PersistentReference const& reference) = 0;
 };
 
 template <typename T>
@@ -37,103 +36,75 @@ template <typename T>
 IPrefVisitor& operator<<(IPrefVisitor& v, T const& x);
 
 template <typename T>
-void VisitObjectBehind(IObjectVisitor& v, T* object)
-{
-    if constexpr (std::is_class<T>::value && !std::is_const<T>::value)
-    {
-        if constexpr (IsObjectClass<T>)
-        {
-            if (object) v.VisitObject(ptr<IObject>(object));
-        }
+void VisitObjectBehind(IObjectVisitor& v, T* object) {
+  if constexpr (std::is_class<T>::value && !std::is_const<T>::value) {
+    if constexpr (IsObjectClass<T>) {
+      if (object) v.VisitObject(ptr<IObject>(object));
     }
+  }
 }
 
 template <typename I>
-void VisitObjectBehind(IObjectVisitor& v, ptr<I> const& p)
-{
-    if constexpr (IsObjectClass<I>)
-    {
-        if (p) v.VisitObject(QueryInterface<IObject>(p));
-    }
+void VisitObjectBehind(IObjectVisitor& v, ptr<I> const& p) {
+  if constexpr (IsObjectClass<I>) {
+    if (p) v.VisitObject(QueryInterface<IObject>(p));
+  }
 }
 
 template <typename T>
-struct ReferenceKind
-{
-    static const int value = 0;
+struct ReferenceKind {
+  static const int value = 0;
 };
 template <typename I>
-struct ReferenceKind<ptr<I>>
-{
-    static const int value = 1;
+struct ReferenceKind<ptr<I>> {
+  static const int value = 1;
 };
 template <typename I>
-struct ReferenceKind<pref<I>>
-{
-    static const int value = 2;
+struct ReferenceKind<pref<I>> {
+  static const int value = 2;
 };
 template <typename C>
-struct ReferenceKind<cref<C>>
-{
-    static const int value = 3;
+struct ReferenceKind<cref<C>> {
+  static const int value = 3;
 };
 
 template <typename V, typename A, typename B>
-void VisitParts(V& v, std::pair<A, B> const& pair)
-{
-    v << pair.first << pair.second;
+void VisitParts(V& v, std::pair<A, B> const& pair) {
+  v << pair.first << pair.second;
 }
 template <typename V, typename T>
-void VisitParts(V& v, T const& x)
-{
-    if constexpr (IsContainer<T>)
-    {
-        for (auto const& item : x) v << item;
-    }
+void VisitParts(V& v, T const& x) {
+  if constexpr (IsContainer<T>) {
+    for (auto const& item : x) v << item;
+  }
 }
 
 template <typename T>
-IObjectVisitor& operator<<(IObjectVisitor& v, T const& x)
-{
-    if constexpr (ReferenceKind<T>::value == 1)
-    {
-        VisitObjectBehind(v, x);
-    }
-    else if constexpr (ReferenceKind<T>::value >= 2)
-    {
-        VisitObjectBehind(v, x.Get());
-    }
-    else if constexpr (std::is_pointer<T>::value)
-    {
-        VisitObjectBehind(v, const_cast<std::remove_const_t<std::remove_pointer_t<T>>*>(x));
-    }
-    else if constexpr (Detects<VisitObjectsMember, T>)
-    {
-        x.VisitObjects(v);
-    }
-    else
-    {
-        VisitParts(v, x);
-    }
-    return v;
+IObjectVisitor& operator<<(IObjectVisitor& v, T const& x) {
+  if constexpr (ReferenceKind<T>::value == 1) {
+    VisitObjectBehind(v, x);
+  } else if constexpr (ReferenceKind<T>::value >= 2) {
+    VisitObjectBehind(v, x.Get());
+  } else if constexpr (std::is_pointer<T>::value) {
+    VisitObjectBehind(v, const_cast<std::remove_const_t<std::remove_pointer_t<T>>*>(x));
+  } else if constexpr (Detects<VisitObjectsMember, T>) {
+    x.VisitObjects(v);
+  } else {
+    VisitParts(v, x);
+  }
+  return v;
 }
 
 template <typename T>
-IPrefVisitor& operator<<(IPrefVisitor& v, T const& x)
-{
-    if constexpr (ReferenceKind<T>::value >= 2)
-    {
-        v.VisitPref(x);
-    }
-    else if constexpr (Detects<VisitPrefsMember, T>)
-    {
-        x.VisitPrefs(v);
-    }
-    else
-    {
-        VisitParts(v, x);
-    }
-    return v;
+IPrefVisitor& operator<<(IPrefVisitor& v, T const& x) {
+  if constexpr (ReferenceKind<T>::value >= 2) {
+    v.VisitPref(x);
+  } else if constexpr (Detects<VisitPrefsMember, T>) {
+    x.VisitPrefs(v);
+  } else {
+    VisitParts(v, x);
+  }
+  return v;
 }
 
 }  // namespace vesk

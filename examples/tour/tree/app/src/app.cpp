@@ -29,6 +29,36 @@ void PrintArguments(vesk::ReflectedArg const* args, vesk::ssize_t count, vesk::C
     xout() << ")\n";
 }
 
+void PrintClass(vesk::ReflectedClass const& record)
+{
+    xout() << "class " << record.m_name << " of " << vesk::TargetOf(record)->m_name << '\n';
+    const vesk::ssize_t interfaces = record.m_numBaseInterfaces + record.m_numInterfaces;
+    for (vesk::ssize_t i = 0; i < interfaces; ++i) xout() << "    isa " << record.m_interfaces[i] << '\n';
+    for (vesk::ssize_t i = 0; i < record.m_numFields; ++i)
+    {
+        vesk::ReflectedField const& field = record.m_fields[i];
+        xout() << "    field " << vesk::TypeText({field.m_type, record.m_strings}) << ' ' << field.m_name << '\n';
+    }
+    for (vesk::ssize_t i = 0; i < record.m_numModelFields; ++i)
+    {
+        vesk::ReflectedModelField const& field = record.m_modelFields[i];
+        xout() << "    model " << vesk::TypeText({field.m_type, record.m_strings}) << ' ' << field.m_name << " since "
+               << field.m_added;
+        if (field.m_dropped >= 0) xout() << " until " << field.m_dropped;
+        xout() << '\n';
+    }
+    for (vesk::ssize_t i = 0; i < record.m_numDepFields; ++i)
+    {
+        xout() << "    dep " << record.m_depFields[i].m_name << '\n';
+    }
+    for (vesk::ssize_t i = 0; i < record.m_numMethods; ++i)
+    {
+        vesk::ReflectedClassMethod const& method = record.m_methods[i];
+        xout() << "    method " << method.m_name;
+        PrintArguments(method.m_args, method.m_numArgs, record.m_strings);
+    }
+}
+
 void PrintReflection()
 {
     xout() << "== What reflection sees\n";
@@ -42,38 +72,18 @@ void PrintReflection()
         }
         xout() << '\n';
     }
-    for (vesk::ReflectedClass const* record : vesk::All<vesk::ReflectedClass>())
-    {
-        xout() << "class " << record->m_name << " of " << vesk::TargetOf(*record)->m_name << '\n';
-        const vesk::ssize_t interfaces = record->m_numBaseInterfaces + record->m_numInterfaces;
-        for (vesk::ssize_t i = 0; i < interfaces; ++i) xout() << "    isa " << record->m_interfaces[i] << '\n';
-        for (vesk::ssize_t i = 0; i < record->m_numFields; ++i)
-        {
-            vesk::ReflectedField const& field = record->m_fields[i];
-            xout() << "    field " << vesk::TypeText({field.m_type, record->m_strings}) << ' ' << field.m_name << '\n';
-        }
-        for (vesk::ssize_t i = 0; i < record->m_numModelFields; ++i)
-        {
-            vesk::ReflectedModelField const& field = record->m_modelFields[i];
-            xout() << "    model " << vesk::TypeText({field.m_type, record->m_strings}) << ' ' << field.m_name << " since " << field.m_added;
-            if (field.m_dropped >= 0) xout() << " until " << field.m_dropped;
-            xout() << '\n';
-        }
-        for (vesk::ssize_t i = 0; i < record->m_numDepFields; ++i) xout() << "    dep " << record->m_depFields[i].m_name << '\n';
-        for (vesk::ssize_t i = 0; i < record->m_numMethods; ++i)
-        {
-            vesk::ReflectedClassMethod const& method = record->m_methods[i];
-            xout() << "    method " << method.m_name;
-            PrintArguments(method.m_args, method.m_numArgs, record->m_strings);
-        }
-    }
+    for (vesk::ReflectedClass const* record : vesk::All<vesk::ReflectedClass>()) PrintClass(*record);
     for (vesk::ReflectedInterface const* record : vesk::All<vesk::ReflectedInterface>())
     {
-        xout() << "interface " << record->m_name << ", methods " << record->m_numInheritedMethods << '+' << record->m_numMethods;
+        xout() << "interface " << record->m_name << ", methods " << record->m_numInheritedMethods << '+'
+               << record->m_numMethods;
         if (record->m_metadata) xout() << ' ' << vesk::DecodeMetadata({record->m_metadata, record->m_strings});
         xout() << '\n';
     }
-    for (vesk::ReflectedVariant const* record : vesk::All<vesk::ReflectedVariant>()) xout() << "variant " << record->m_name << '\n';
+    for (vesk::ReflectedVariant const* record : vesk::All<vesk::ReflectedVariant>())
+    {
+        xout() << "variant " << record->m_name << '\n';
+    }
     for (vesk::ReflectedTypedef const* record : vesk::All<vesk::ReflectedTypedef>())
     {
         xout() << "typedef " << vesk::TypeText({record->m_type, record->m_strings}) << ' ' << record->m_name << '\n';
@@ -194,8 +204,8 @@ void Recalculate()
     show("many");
     shop.label.TryEvict(false);
     show("evicted");
-    xout() << "    a share: " << shop.Share(4, 2) << ' ' << shop.Share(4, 2) << ' ' << shop.Share(5, 2) << ", calculations "
-           << shop.m_calculations << ", evictions " << shop.m_evictions << '\n';
+    xout() << "    a share: " << shop.Share(4, 2) << ' ' << shop.Share(4, 2) << ' ' << shop.Share(5, 2)
+           << ", calculations " << shop.m_calculations << ", evictions " << shop.m_evictions << '\n';
     xout() << "    the forecast: " << shop.Forecast();
     vesk::RunAsyncCalculations();
     xout() << ", later " << shop.Forecast();
@@ -225,7 +235,7 @@ void SmallKinds()
 
     Shop shop;
     $makefunctor orders::Discount none { return price; }
-    $makeconstfunctor orders::Discount bulk(&shop, Shop) { return pieces > 10 ? price * 0.9 : price - Share(1, 1) * 0; }
+    $makeconstfunctor orders::Discount bulk(&shop, Shop) { return pieces > 10 ? price * 0.9 : price; }
     xout() << "discounts: " << none(100, 20) << ' ' << bulk(100, 20) << ", with tax " << orders::WithTax(100)
            << ", dozens " << orders::Dozens(2) << '\n';
 
