@@ -10,6 +10,7 @@ namespace qrex {
 namespace {
 
 constexpr int64_t kQueues = 8;
+constexpr size_t kMaxKeys = 100;  // the texts of nested pairs grow with the square of their number
 
 class CachedFunction {
  public:
@@ -114,6 +115,7 @@ void CachedFunction::Normalise() {
     m_signature.arguments.erase(m_signature.arguments.begin());
   }
   m_output = TypeText(m_signature.returnType);
+  if (m_signature.arguments.size() > kMaxKeys) m_parser.Fail("Too many parameters on $cache function");
 }
 
 void CachedFunction::ReadInput() {

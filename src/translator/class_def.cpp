@@ -97,7 +97,9 @@ bool ClassDef::AnyModelField(bool (*test)(std::string_view, NameSpace&), TriStat
   return cache == TriState::On;
 }
 
-bool ClassDef::IsIObjectVisitable() const { return AnyModelField(NeedsVisitObjects, m_isIObjectVisitable); }
+bool ClassDef::IsIObjectVisitable() const {
+  return m_hasVisitBlock || AnyModelField(NeedsVisitObjects, m_isIObjectVisitable);
+}
 bool ClassDef::IsPrefVisitable() const { return AnyModelField(NeedsVisitPrefs, m_isPrefVisitable); }
 
 uint32_t ClassDef::TypeOpsBits() const {

@@ -8,7 +8,7 @@ namespace qrex {
 
 namespace {
 
-constexpr size_t kMaxLeaves = 100000;
+constexpr size_t kMaxLevels = 100, kMaxLeaves = 100000;
 
 // One level per polymorphic argument; each has a case per item of its variant.
 class Dispatch {
@@ -24,7 +24,8 @@ class Dispatch {
       }
       m_levels.push_back({&argument, variant, 0});
       leaves *= variant->m_items.size();
-      if (leaves > kMaxLeaves) parser.Fail("Too many combinations of polymorphic arguments");
+      if (leaves > kMaxLeaves || m_levels.size() > kMaxLevels)
+        parser.Fail("Too many combinations of polymorphic arguments");
     }
   }
 

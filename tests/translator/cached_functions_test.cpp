@@ -13,12 +13,6 @@ class CachedFunctionsTest : public TranslateTest {
     const size_t begin = header.find("//\n") + 3;
     return header.substr(begin, header.find("int end;\n") - begin);
   }
-  // From the node on.
-  std::string Node(const std::string& body, const std::string& head = "$struct S") {
-    const std::string text = Body(body, head);
-    const size_t begin = text.find("struct _depnode_");
-    return begin == std::string::npos ? text : text.substr(begin);
-  }
 };
 
 TEST_F(CachedFunctionsTest, Plain) {
@@ -51,20 +45,28 @@ inline vesk::int32 const& f() const
             Body("$cache <<queue(1 + 2) visit>> inline int32 f() const\n{\n    return 1; \n}\n"));
 }
 
-TEST_F(CachedFunctionsTest, HardByReferenceInMixin) {
-  EXPECT_EQ(R"~(void _calc_f(vesk::xvector<vesk::int32>& out) const
+TEST_F(CachedFunctionsTest, AsyncByReferenceWithInputInMixin) {
+  EXPECT_EQ(
+      R"~(void _calc_f_input(vesk::string8& in) const
+{
+    in = name();
+}
+void _calc_f(vesk::xvector<vesk::int32>& out,vesk::string8 in) const
 { }
 
-struct _depnode_f : public vesk::DGSyncDepNode<_depnode_f,M,vesk::xvector<vesk::int32>>
+struct _depnode_f : public vesk::DGAsyncNodeOnInput<_depnode_f,M,vesk::string8,vesk::xvector<vesk::int32>>
 {
-    typedef vesk::DGSyncDepNode<_depnode_f,M,vesk::xvector<vesk::int32>> base;
+    typedef vesk::DGAsyncNodeOnInput<_depnode_f,M,vesk::string8,vesk::xvector<vesk::int32>> base;
     using typename base::output_type;
-    _depnode_f() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }
-    virtual bool RecalcCache() const
+    using typename base::input_type;
+    _depnode_f() { SetFlag(vesk::DF_ASYNC_IO); }
+    static void CalcOutput(const M* _self, output_type& _output, const input_type& _input)
     {
-        _GetSelf()->_calc_f(_output);
-        if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();
-        return true;
+        _self->_calc_f(_output,_input);
+    }
+    static void CalcInput(const M* _self, input_type& _input)
+    {
+        _self->_calc_f_input(_input);
     }
     M const* _GetSelf() const { return CONST_ATTRIB_CAST(M,_dn_f); }
     const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename BC::FinalClass*>(_GetSelf()); }
@@ -75,77 +77,22 @@ vesk::xvector<vesk::int32> const& f() const
     return _dn_f.read();
 }
 )~",
-            Body("$cache - ^ void f(xvector<int32>& out) const { }\n", "$mixin M"));
+      Body("$cache - ^ <<async io>> void f(xvector<int32>& out) const with string8 in = name(); { }\n", "$mixin M"));
 }
 
-TEST_F(CachedFunctionsTest, AsyncWithInput) {
-  EXPECT_EQ(R"~(void _calc_f_input(vesk::string8& in) const
-{
-    in = name();
-}
-vesk::int32 _calc_f(vesk::string8 in) const
-{ return size(in); }
+TEST_F(CachedFunctionsTest, AsyncKeyedByOne) {
+  EXPECT_EQ(R"~(vesk::int32 _calc_f(vesk::string8 const& k="") const
+{ }
 
-struct _depnode_f : public vesk::DGAsyncNodeOnInput<_depnode_f,S,vesk::string8,vesk::int32>
+struct _depnode_f : public vesk::DGKeyedAsyncIndepNode<_depnode_f,M,vesk::string8,vesk::int32>
 {
-    typedef vesk::DGAsyncNodeOnInput<_depnode_f,S,vesk::string8,vesk::int32> base;
-    using typename base::output_type;
-    using typename base::input_type;
-    _depnode_f() { SetFlag(vesk::DF_ASYNC_IO); }
-    static void CalcOutput(const S* _self, output_type& _output, const input_type& _input)
-    {
-        _output = _self->_calc_f(_input);
-    }
-    static void CalcInput(const S* _self, input_type& _input)
-    {
-        _self->_calc_f_input(_input);
-    }
-    S const* _GetSelf() const { return CONST_ATTRIB_CAST(S,_dn_f); }
-    S const* _GetFinalSelf() const { return _GetSelf(); }
-    virtual vesk::xstring Name() const { return "S::f()"; }
-} _dn_f;
-vesk::int32 const& f() const
-{
-    return _dn_f.read();
-}
-)~",
-            Body("$cache <<async io>> int32 f() const with string8 in = name(); { return size(in); }\n"));
-}
-
-TEST_F(CachedFunctionsTest, AsyncWithoutInput) {
-  EXPECT_EQ(R"~(struct _depnode_f : public vesk::DGAsyncIndepNode<_depnode_f,S,vesk::int32>
-{
-    typedef vesk::DGAsyncIndepNode<_depnode_f,S,vesk::int32> base;
-    using typename base::output_type;
-    static void CalcOutput(const S* _self, output_type& _output)
-    {
-        _self->_calc_f(_output);
-    }
-    S const* _GetSelf() const { return CONST_ATTRIB_CAST(S,_dn_f); }
-    S const* _GetFinalSelf() const { return _GetSelf(); }
-    virtual vesk::xstring Name() const { return "S::f()"; }
-} _dn_f;
-vesk::int32 const& f() const
-{
-    return _dn_f.read();
-}
-)~",
-            Node("$cache ^ <<io async -io>> void f(int32& n) const { }\n"));
-}
-
-TEST_F(CachedFunctionsTest, KeyedByOne) {
-  EXPECT_EQ(R"~(struct _depnode_f : public vesk::DGKeyedSyncDepNode<_depnode_f,M,vesk::string8,vesk::int32>
-{
-    typedef vesk::DGKeyedSyncDepNode<_depnode_f,M,vesk::string8,vesk::int32> base;
+    typedef vesk::DGKeyedAsyncIndepNode<_depnode_f,M,vesk::string8,vesk::int32> base;
     using typename base::key_type;
     using typename base::output_type;
     using typename base::map_type;
-    virtual bool RecalcCache() const
+    static void CalcOutput(const M* _self, output_type& _output, const key_type& _key)
     {
-        auto _prev = _output;
-        _output = _self->_calc_f(_GetKey());
-        if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();
-        return _prev != _output;
+        _output = _self->_calc_f(_key);
     }
     virtual vesk::xstring Name() const
     {
@@ -160,7 +107,7 @@ vesk::int32 const& f(vesk::string8 const& k="") const
     return _map_f[k].read(this);
 }
 )~",
-            Node("$cache int32 f(string8 const& k = \"\") const { }\n", "$mixin M"));
+            Body("$cache <<io async -io>> int32 f(string8 const& k = \"\") const { }\n", "$mixin M"));
 }
 
 TEST_F(CachedFunctionsTest, KeyedBySeveralByReference) {
@@ -200,23 +147,23 @@ bool const& f(vesk::int32 a,vesk::string8 const& b,vesk::float64 c) const
       Body("$cache ^ <<queue(7)>> void f(bool& out, int32 a, string8 const& b, float64 c) const { }\n"));
 }
 
-TEST_F(CachedFunctionsTest, KeyedAsyncWithInput) {
-  EXPECT_EQ(R"~(void _calc_f_input(vesk::string8& in,vesk::int32 a,bool b) const
+TEST_F(CachedFunctionsTest, PartsOfOtherForms) {
+  std::string text = Body("$cache ^ void f(bool& b) const { }\n");
+  EXPECT_EQ("\n        _GetSelf()->_calc_f(_output);\n", Section(text, "RecalcCache() const\n    {", "        if"));
+  EXPECT_EQ("bool>\n", Section(text, "DGSyncDepNode<_depnode_f,S,", "{"));
 
-{ in = name(a, b); } 
+  text = Body("$cache int32 f(int32 const& a) const { }\n");
+  EXPECT_EQ("        auto _prev = _output;\n        _output = _self->_calc_f(_GetKey());\n",
+            Section(text, "RecalcCache() const\n    {\n", "        if"));
 
-vesk::int32 _calc_f(vesk::int32 a,bool b,vesk::string8 in) const
-{ return size(in); }
-
-struct _depnode_f : public vesk::DGKeyedAsyncNodeOnInput<_depnode_f,S,std::pair<vesk::int32,bool>,vesk::string8,vesk::int32>
-{
-    typedef vesk::DGKeyedAsyncNodeOnInput<_depnode_f,S,std::pair<vesk::int32,bool>,vesk::string8,vesk::int32> base;
-    using typename base::key_type;
-    using typename base::output_type;
-    using typename base::map_type;
-    using typename base::input_type;
-    _depnode_f() { SetFlag(vesk::DF_ASYNC_IO); }
-    static void CalcOutput(const S* _self, output_type& _output, const key_type& _key, const input_type& _input)
+  text = Body("$cache <<async>> int32 f(int32 a, bool b) const with string8 in { in = $$; } { return size(in); }\n");
+  EXPECT_EQ("(vesk::string8& in,vesk::int32 a,bool b) const\n\n{ in = S; } \n\n",
+            Section(text, "_input", "vesk::int32 _calc"));
+  EXPECT_EQ("(vesk::int32 a,bool b,vesk::string8 in) const\n", Section(text, "vesk::int32 _calc_f", "{"));
+  EXPECT_EQ("std::pair<vesk::int32,bool>,vesk::string8,vesk::int32>\n",
+            Section(text, "DGKeyedAsyncNodeOnInput<_depnode_f,S,", "{"));
+  EXPECT_EQ(
+      R"(    static void CalcOutput(const S* _self, output_type& _output, const key_type& _key, const input_type& _input)
     {
         _output = _self->_calc_f(_key.first,_key.second,_input);
     }
@@ -224,22 +171,8 @@ struct _depnode_f : public vesk::DGKeyedAsyncNodeOnInput<_depnode_f,S,std::pair<
     {
         _self->_calc_f_input(_input,_key.first,_key.second);
     }
-    virtual vesk::xstring Name() const
-    {
-        std::pair<vesk::int32,bool> const& _key = _GetKey();
-        return vxMakeString("S::f(" << _key.first << ',' << _key.second << ')');
-    }
-    map_type& _GetMap() const { return _self->_map_f; }
-    S const* _GetFinalSelf() const { return _self; }
-};
-mutable typename _depnode_f::map_type _map_f;
-vesk::int32 const& f(vesk::int32 a,bool b) const
-{
-    return _map_f[std::make_pair(a,b)].read(this);
-}
-)~",
-            Body("$cache <<async io>> int32 f(int32 a, bool b) const with string8 in { in = name(a, b); } "
-                 "{ return size(in); }\n"));
+)",
+      Section(text, "using typename base::input_type;\n", "    virtual"));
 }
 
 TEST_F(CachedFunctionsTest, Errors) {

@@ -94,36 +94,11 @@ vesk::string8 const& Geta() const { a.ReadBarrier(); return _a_; }
                  "evict { $new X(1); $other; } invalidate\n{\n    stale();\n}\n;\n"));
 }
 
-TEST_F(DepFieldsTest, HardShortForm) {
-  EXPECT_EQ(R"(void a_calc(vesk::int32& a) const
-{
-    a = b + 1;
-}
-mutable vesk::int32 _a_;
-struct Depnode_a : vesk::DGDepNode
-{
-    typedef vesk::int32 value_type;
-    Depnode_a() : vesk::DGDepNode(vesk::DF_SYNC_DEP|vesk::DF_PROPAGATE_HARD_DIRTINESS) {}
-    virtual vesk::ssize_t ByteSize() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        return vesk::CacheValueAdditionalSize(_self->_a_);
-    }
-    virtual vesk::xstring Name() const { return "S::a"; }
-    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _v << _self->_a_;
-    }
-    virtual bool RecalcCache() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_calc(_self->_a_);
-        if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();
-        return true;
-    }
-    virtual bool IsEvictable() const
-    {
+TEST_F(DepFieldsTest, DepWithoutSections) {
+  const std::string text = Body("$dep int32 a = b + 1;\n");
+  EXPECT_EQ("(vesk::int32& a) const\n{\n    a = b + 1;\n}\n", Section(text, "void a_calc", "mutable"));
+  EXPECT_EQ("vesk::DGDepNode(vesk::DF_SYNC_DEP) {}\n", Section(text, "Depnode_a() : ", "    virtual"));
+  EXPECT_EQ(R"(    {
         S const* _self = CONST_ATTRIB_CAST(S,a);
         return vesk::CacheValueIsEvictable(_self->_a_);
     }
@@ -136,31 +111,24 @@ struct Depnode_a : vesk::DGDepNode
     operator value_type() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
 } a;
 vesk::int32 Geta() const { a.ReadBarrier(); return _a_; }
-
 )",
-            Body("$dep ^ int32 a = b + 1;\n"));
+            Section(text, "virtual bool IsEvictable() const\n", "\n\n") + "\n");
+  EXPECT_EQ(R"(    {
+        S const* _self = CONST_ATTRIB_CAST(S,a);
+        _self->a_calc(_self->_a_);
+        if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();
+        return true;
+    }
+)",
+            Section(Body("$dep ^ int32 a = 1;\n"), "RecalcCache() const\n", "    virtual"));
 }
 
 TEST_F(DepFieldsTest, VoidDep) {
-  EXPECT_EQ(R"(void d_calc() const
-{
-    go();
-    done();
-}
-struct Depnode_d : vesk::DGDepNode
-{
-    typedef void value_type;
-    Depnode_d() : vesk::DGDepNode(vesk::DF_SYNC_DEP|vesk::DF_PROPAGATE_HARD_DIRTINESS) {}
-    virtual vesk::ssize_t ByteSize() const
-    {
-        return 0;
-    }
-    virtual vesk::xstring Name() const { return "S::d"; }
-    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
-    {
-    }
-    virtual bool RecalcCache() const
-    {
+  const std::string text = Body("$dep void d = { go();\ndone(); };\n");
+  EXPECT_EQ("() const\n{\n    go();\n    done();\n}\n", Section(text, "void d_calc", "struct Depnode_d"));
+  EXPECT_EQ("    {\n        return 0;\n    }\n", Section(text, "ByteSize() const\n", "    virtual"));
+  EXPECT_EQ("    {\n    }\n", Section(text, "VisitContainingObject(vesk::IObjectVisitor& _v) const\n", "    virtual"));
+  EXPECT_EQ(R"(    {
         S const* _self = CONST_ATTRIB_CAST(S,d);
         _self->d_calc();
         return true;
@@ -174,19 +142,17 @@ struct Depnode_d : vesk::DGDepNode
 } d;
 
 )",
-            Body("$dep void d = { go();\ndone(); };\n"));
+            Section(text, "RecalcCache() const\n", ""));
 }
 
 TEST_F(DepFieldsTest, ShortBodies) {
   const auto bodyOf = [this](const std::string& definition) {
-    const std::string text = Body("$dep int32 a = " + definition + "\n");
-    return text.substr(0, text.find("mutable"));
+    return Section(Body("$dep int32 a = " + definition + "\n"), "void a_calc(vesk::int32& a) const\n{\n", "}\nmutable");
   };
-  const std::string head = "void a_calc(vesk::int32& a) const\n";
-  EXPECT_EQ(head + "{\n    a = f(x, y);\n}\n", bodyOf("f(x, y) /* why */ ;"));
-  EXPECT_EQ(head + "{\n    a = vesk::DollarNew(new X(1))->n + S::k;\n}\n", bodyOf("$new X(1)->n + $$::k;"));
-  EXPECT_EQ(head + "{\n    a = this->GetThisAsFinalClass()->b;\n}\n", bodyOf("{ a = $this->b; };"));
-  EXPECT_EQ(head + "{\n    if (x) { a = 1; } // one\n}\n", bodyOf("{ if (x) { a = 1; } // one\n };"));
+  EXPECT_EQ("    a = f(x, y);\n", bodyOf("f(x, y) /* why */ ;"));
+  EXPECT_EQ("    a = vesk::DollarNew(new X(1))->n + S::k;\n", bodyOf("$new X(1)->n + $$::k;"));
+  EXPECT_EQ("    a = this->GetThisAsFinalClass()->b;\n", bodyOf("{ a = $this->b; };"));
+  EXPECT_EQ("    if (x) { a = 1; } // one\n", bodyOf("{ if (x) { a = 1; } // one\n };"));
 }
 
 TEST_F(DepFieldsTest, IndepWithSections) {
@@ -243,10 +209,7 @@ void Setw(int* _v) { w.OnChange(); _w_ = _v; }
 
 TEST_F(DepFieldsTest, VisitingOfTheContainingObject) {
   const auto visitOf = [this](const std::string& head, const std::string& field) {
-    const std::string text = Body(field, head);
-    const std::string heading = "VisitContainingObject(vesk::IObjectVisitor& _v) const\n    {\n";
-    const size_t begin = text.find(heading) + heading.size();
-    return text.substr(begin, text.find("    }\n", begin) - begin);
+    return Section(Body(field, head), "VisitContainingObject(vesk::IObjectVisitor& _v) const\n    {\n", "    }\n");
   };
   const std::string self = "        S const* _self = CONST_ATTRIB_CAST(S,a);\n";
   EXPECT_EQ("", visitOf("$struct S", "$indep <<-visit>> int32 a;\n"));
@@ -273,6 +236,12 @@ void VisitObjects(vesk::IObjectVisitor& v) const
   EXPECT_EQ(
       "\nvoid VisitObjects(vesk::IObjectVisitor& v) const\n{\n    BaseClass::VisitObjects(v);\n    v << x;\n}\n\n",
       Body("$visit { v << x; }\n", "$mixin S"));
+}
+
+TEST_F(DepFieldsTest, VisitBlockMakesVisitable) {
+  const Generated generated = TranslateHeader("$struct+ S { $visit { } };\n");
+  EXPECT_NE(std::string::npos, generated.header.find("operator<<(vesk::IObjectVisitor& _v,S const& _x)"));
+  EXPECT_NE(std::string::npos, generated.tail.find("vesk::VisitObjectsInArray<S>,\n"));
 }
 
 TEST_F(DepFieldsTest, BlocksOfClassWithRegistration) {
