@@ -41,7 +41,7 @@ void ParseBaseList(QrexParser& parser, std::vector<ClassDef*>& bases) {
       parser.RequireIdentifier();
     }
     if (parser.Is(kLess)) {
-      parser.SkipToMatching(kLess, kGreater, "Met EOS before read matching angled bracket");
+      parser.SkipAngles("Met EOS before read matching angled bracket");
       parser.Advance();
     } else if (parser.Is(kOpenParen)) {
       parser.SkipToMatching(kOpenParen, kCloseParen, "Met EOS before read matching round bracket");

@@ -59,14 +59,9 @@ std::string_view KeywordOf(ClassKind kind) {
 void ClassStatement::ReadHeading() {
   m_parser.RequireIObjectImport();
   m_parser.Advance();
-  const LexToken plus = m_parser.current;
   m_exported = m_parser.ParseExportModifier();
-  if (m_exported && m_kind == ClassKind::Mixin) {
-    throw LexScannerException("'+' modifier not permitted on $mixin", plus);
-  }
-  if (m_exported && IsNested()) {
-    throw LexScannerException("'+' modifier not permitted on nested classes or structs", plus);
-  }
+  if (m_exported && m_kind == ClassKind::Mixin) m_parser.Fail("'+' modifier not permitted on $mixin");
+  if (m_exported && IsNested()) m_parser.Fail("'+' modifier not permitted on nested classes or structs");
   if (m_parser.Is("implement")) {
     if (m_kind != ClassKind::Adt) m_parser.Fail("'implement' modifier only permitted on $adt");
     m_implement = true;
@@ -109,14 +104,12 @@ void ClassStatement::ReadTemplateArguments() {
   std::string names;
   auto takeName = [&](std::string_view where) {
     if (m_parser.previous.kind != kIdentifier) {
-      throw LexScannerException(
-          "Expected identifier before " + std::string(where) + " when read " + Printed(m_parser.previous),
-          m_parser.previous);
+      m_parser.Fail("Expected identifier before " + std::string(where) + " when read " + Printed(m_parser.previous));
     }
     names += m_parser.previous.text.View();
   };
   for (int64_t depth = 0;; m_parser.Advance()) {
-    if (m_parser.Is(kEndOfText)) m_parser.Fail("Met EOS before read matched angled bracket");
+    if (m_parser.Is(kEndOfText)) m_parser.Fail("Met EOS before read matching angled bracket");
     if (m_parser.Is(kLess)) ++depth;
     if (m_parser.Is(kGreater) && --depth == 0) break;
     if (m_parser.Is(kComma) && depth == 1) {

@@ -1,7 +1,6 @@
 #include "translator/name_space.h"
 
 #include <algorithm>
-#include <unordered_set>
 
 #include "lex/token.h"
 #include "translator/scanned_file.h"
@@ -25,46 +24,61 @@ std::string PrintedElement(const NameSpaceElement& element) {
   return text.TakeText();
 }
 
-void SymbolIndex::Enter(const std::string& qualifiedName, NameSpaceElement& element) {
-  m_elements[qualifiedName].push_back(&element);
+// --- Symbols
+
+void Symbol::Enter(NameSpaceElement& element) {
+  if (m_newest) (m_newest->GetDeclStatus() == DeclStatus::Forward ? m_forward : m_declared).push_back(m_newest);
+  m_newest = &element;
+  m_categories |= 1u << static_cast<unsigned>(element.category);
 }
 
-void SymbolIndex::Remove(const std::string& qualifiedName, const NameSpaceElement& element) {
-  auto found = m_elements.find(qualifiedName);
-  if (found != m_elements.end()) std::erase(found->second, &element);
-}
-
-const std::vector<NameSpaceElement*>* SymbolIndex::Find(const std::string& qualifiedName) const {
-  auto found = m_elements.find(qualifiedName);
-  return found == m_elements.end() ? nullptr : &found->second;
-}
-
-namespace {
-
-// The files that `file` sees, in order of first import, as far as they stand in `candidates`' owners: only needed where
-// several of them declare one name, so the walk over the imports is not made for each look-up.
-class ImportOrder {
- public:
-  explicit ImportOrder(const ScannedFile& file) { Visit(file); }
-  size_t Of(const ScannedFile& file) const {
-    auto found = m_order.find(&file);
-    return found == m_order.end() ? m_order.size() : found->second;
+void Symbol::Remove(const NameSpaceElement& element) {
+  if (m_newest == &element) {
+    m_newest = nullptr;
+  } else if (std::erase(m_declared, &element) == 0) {
+    std::erase(m_forward, &element);
   }
+}
 
- private:
-  void Visit(const ScannedFile& root) {
-    std::vector<const ScannedFile*> pending(root.imports.rbegin(), root.imports.rend());
-    while (!pending.empty()) {
-      const ScannedFile* file = pending.back();
-      pending.pop_back();
-      if (!m_order.emplace(file, m_order.size()).second) continue;
-      pending.insert(pending.end(), file->imports.rbegin(), file->imports.rend());
+bool Symbol::HasNameSpace(const IndexSet& files) const {
+  if (!(m_categories >> static_cast<unsigned>(Category::NameSpace) & 1)) return false;
+  auto counts = [&](const NameSpaceElement* element) {
+    return element->category == Category::NameSpace && files.Has(element->owner.index);
+  };
+  return (m_newest && counts(m_newest)) || std::any_of(m_declared.begin(), m_declared.end(), counts);
+}
+
+NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) const {
+  NameSpaceElement* result = own;
+  auto consider = [&](NameSpaceElement* element) {
+    if (!files.Has(element->owner.index)) return;
+    if (!result) {
+      result = element;
+      return;
     }
+    const DeclStatus a = result->GetDeclStatus();
+    const DeclStatus b = element->GetDeclStatus();
+    if (result->category != element->category || (a != DeclStatus::Forward && a == b)) {
+      throw LexScannerException("Ambiguous identifier : " + result->name, nullptr);
+    }
+    if (b > a) result = element;
+  };
+  for (NameSpaceElement* element : m_declared) consider(element);
+  if (m_newest) consider(m_newest);
+  const bool mayDiffer = (m_categories & (m_categories - 1)) != 0;
+  for (NameSpaceElement* element : m_forward) {
+    if (result && !mayDiffer) break;
+    consider(element);
   }
-  std::unordered_map<const ScannedFile*, size_t> m_order;
-};
+  return result;
+}
 
-}  // namespace
+const Symbol* SymbolIndex::Find(std::string_view qualifiedName) const {
+  auto found = m_symbols.find(qualifiedName);
+  return found == m_symbols.end() ? nullptr : &found->second;
+}
+
+// --- Name spaces
 
 NameSpace::NameSpace(ScannedFile& owner, NameSpace* parent, std::string name)
     : NameSpaceElement(owner, nullptr, Category::NameSpace) {
@@ -72,8 +86,6 @@ NameSpace::NameSpace(ScannedFile& owner, NameSpace* parent, std::string name)
   this->parent = parent;
   status = DeclStatus::Defined;
 }
-
-NameSpace::~NameSpace() = default;
 
 std::string NameSpace::KeyOf(std::string_view elementName) const {
   std::string key = GetQualifiedName();
@@ -90,49 +102,24 @@ void NameSpace::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   for (const auto& [elementName, element] : m_elements) element->WriteReflection(out, lists);
 }
 
+const Symbol* NameSpace::FindSymbol(std::string_view elementName) const {
+  const SymbolIndex& symbols = owner.host.Symbols();
+  return IsRoot() ? symbols.Find(elementName) : symbols.Find(KeyOf(elementName));
+}
+
 NameSpaceElement* NameSpace::LookupLocal(std::string_view elementName) {
   auto found = m_elements.find(elementName);
   if (found != m_elements.end()) return found->second.get();
   // A name space that an import opened stands here as well. It is made when first asked for.
-  const auto* candidates = owner.host.Symbols().Find(KeyOf(elementName));
-  if (!candidates) return nullptr;
-  for (const NameSpaceElement* candidate : *candidates) {
-    if (candidate->category == Category::NameSpace && owner.mounted.Has(candidate->owner.index)) {
-      return FindOrCreateNameSpace(elementName);
-    }
-  }
-  return nullptr;
+  const Symbol* symbol = FindSymbol(elementName);
+  return symbol && symbol->HasNameSpace(owner.mounted) ? FindOrCreateNameSpace(elementName) : nullptr;
 }
 
 NameSpaceElement* NameSpace::Lookup(std::string_view elementName) {
-  NameSpaceElement* result = LookupLocal(elementName);
-  if (result && result->category == Category::NameSpace) return result;
-  const auto* all = owner.host.Symbols().Find(KeyOf(elementName));
-  if (!all) return result;
-
-  std::vector<NameSpaceElement*> mounted;
-  for (NameSpaceElement* element : *all) {
-    if (owner.mounted.Has(element->owner.index)) mounted.push_back(element);
-  }
-  if (mounted.size() > 1) {
-    ImportOrder order(owner);
-    std::stable_sort(mounted.begin(), mounted.end(), [&](const NameSpaceElement* a, const NameSpaceElement* b) {
-      return order.Of(a->owner) < order.Of(b->owner);
-    });
-  }
-  for (NameSpaceElement* element : mounted) {
-    if (!result) {
-      result = element;
-      continue;
-    }
-    DeclStatus a = result->GetDeclStatus();
-    DeclStatus b = element->GetDeclStatus();
-    if (result->category != element->category || (a != DeclStatus::Forward && a == b)) {
-      throw LexScannerException("Ambiguous identifier : " + std::string(elementName), nullptr);
-    }
-    if (b > a) result = element;
-  }
-  return result;
+  NameSpaceElement* own = LookupLocal(elementName);
+  if (own && own->category == Category::NameSpace) return own;
+  const Symbol* symbol = FindSymbol(elementName);
+  return symbol ? symbol->Choose(own, owner.mounted) : own;
 }
 
 NameSpaceElement* NameSpace::LookupPath(std::string_view path) {
@@ -156,15 +143,14 @@ NameSpace* NameSpace::FindOrCreateNameSpace(std::string_view elementName) {
 NameSpaceElement& NameSpace::Add(std::unique_ptr<NameSpaceElement> element) {
   element->parent = this;
   NameSpaceElement& added = *element;
-  const std::string key = KeyOf(added.name);
   std::unique_ptr<NameSpaceElement>& slot = m_elements[added.name];
-  SymbolIndex& symbols = owner.host.Symbols();
+  Symbol& symbol = owner.host.Symbols().Enter(KeyOf(added.name));
   if (slot) {
-    symbols.Remove(key, *slot);
+    symbol.Remove(*slot);
     m_replaced.push_back(std::move(slot));
   }
   slot = std::move(element);
-  symbols.Enter(key, added);
+  symbol.Enter(added);
   return added;
 }
 

@@ -3,7 +3,8 @@
 // A name space's tree is private to its file. Importing a file never copies elements: the imported files become visible
 // ("mounted"), and a name space of the same path in several files is searched as one. Because a file may see thousands
 // of others, nothing is copied per import either: one SymbolIndex per build lists the declarations of each qualified
-// name, and a look-up keeps those whose file stands in the asking file's closure, a bit set.
+// name, and a look-up keeps those whose file stands in the asking file's closure, a bit set. Its cost does not grow
+// with the number of files.
 #pragma once
 
 #include <cstdint>
@@ -14,6 +15,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "text/index_set.h"
 #include "text/text_writer.h"
 
 namespace qrex {
@@ -75,21 +77,42 @@ class NameSpaceElement {
   mutable std::string m_qualifiedName;
 };
 
-// Every declaration of the build by qualified name. Kept by NameSpace::Add and the destructor of NameSpace.
-class SymbolIndex {
+// All declarations of one qualified name in a build. What is only forward declared may stand in hundreds of files and
+// never conflicts: it is kept apart, so that a look-up reads the few declarations that say more. The status of an
+// element moves only while its own statement is read, so the newest one is sorted in when the next of its name comes.
+class Symbol {
  public:
-  void Enter(const std::string& qualifiedName, NameSpaceElement& element);
-  void Remove(const std::string& qualifiedName, const NameSpaceElement& element);
-  const std::vector<NameSpaceElement*>* Find(const std::string& qualifiedName) const;  // or null
+  void Enter(NameSpaceElement& element);
+  void Remove(const NameSpaceElement& element);
+  bool HasNameSpace(const IndexSet& files) const;
+  // The declaration that counts for a file that sees `files` and holds `own` (or null) itself; or null. Throws
+  // "Ambiguous identifier : ".
+  NameSpaceElement* Choose(NameSpaceElement* own, const IndexSet& files) const;
 
  private:
-  std::unordered_map<std::string, std::vector<NameSpaceElement*>> m_elements;
+  std::vector<NameSpaceElement*> m_declared;  // in the order of the build, as the next
+  std::vector<NameSpaceElement*> m_forward;
+  NameSpaceElement* m_newest = nullptr;
+  uint32_t m_categories = 0;  // a bit for each category that was entered
+};
+
+// Every declaration of the build by qualified name, kept by NameSpace::Add.
+class SymbolIndex {
+ public:
+  Symbol& Enter(const std::string& qualifiedName) { return m_symbols[qualifiedName]; }
+  const Symbol* Find(std::string_view qualifiedName) const;  // or null
+
+ private:
+  struct Hash {
+    using is_transparent = void;
+    size_t operator()(std::string_view text) const { return std::hash<std::string_view>()(text); }
+  };
+  std::unordered_map<std::string, Symbol, Hash, std::equal_to<>> m_symbols;
 };
 
 class NameSpace : public NameSpaceElement {
  public:
   NameSpace(ScannedFile& owner, NameSpace* parent, std::string name);  // a root has no parent and an empty name
-  ~NameSpace() override;
 
   std::string_view GetKeyword() const override { return "namespace"; }
   std::string_view GetReflectedKindName() const override { return {}; }
@@ -116,6 +139,7 @@ class NameSpace : public NameSpaceElement {
 
  private:
   std::string KeyOf(std::string_view name) const;
+  const Symbol* FindSymbol(std::string_view name) const;  // or null
   std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>> m_elements;
   std::vector<std::unique_ptr<NameSpaceElement>> m_replaced;  // earlier declarations: others may still refer to them
 };

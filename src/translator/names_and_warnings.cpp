@@ -44,8 +44,9 @@ NameSpaceElement& QrexParser::ParseQualifiedId() {
 }
 
 bool QrexParser::ParseExportModifier() {
+  if (Is(kPlusPlus)) Fail("'+' modifier repeated");
   if (!Accept(kPlus)) return false;
-  if (Is(kPlus)) Fail("'+' modifier repeated");
+  if (Is(kPlus) || Is(kPlusPlus)) Fail("'+' modifier repeated");
   return true;
 }
 

@@ -17,9 +17,10 @@ void Define(ScannedFile& file, std::string_view name, std::string value) {
 void DefineMacroMark(ScannedFile& file, const std::string& piece) {
   auto mark = std::make_unique<LSMacroVariable>();
   const std::string name = "@macro" + piece;
-  mark->name = TextRange(std::string_view(name));
-  mark->body = TextRange(mark->name.end, mark->name.end);
-  mark->OwnText(mark->name);
+  const TextRange text{std::string_view(name)};
+  mark->name = text;
+  mark->body = TextRange(text.end, text.end);
+  mark->OwnText(text);
   file.frame.AddVariable(std::move(mark));
 }
 

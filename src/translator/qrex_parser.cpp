@@ -198,8 +198,20 @@ void QrexParser::SkipToMatching(int32_t open, int32_t close, std::string_view at
   }
 }
 
-void QrexParser::SkipAngles() {
-  SkipToMatching(kLess, kGreater, "Reached end of stream while scanning for matching >");
+void QrexParser::SplitShiftRight() {
+  if (!Is(kShiftRight)) return;
+  current.kind = kGreater;
+  current.text.end = current.text.begin + 1;
+  scanner.begin = current.text.end;
+}
+
+void QrexParser::SkipAngles(std::string_view atEnd) {
+  for (int64_t depth = 0;; Advance()) {
+    if (Is(kEndOfText)) Fail(std::string(atEnd));
+    SplitShiftRight();
+    if (Is(kLess)) ++depth;
+    if (Is(kGreater) && --depth == 0) return;
+  }
 }
 
 // --- $new, $init, $uninit

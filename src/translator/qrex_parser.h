@@ -73,8 +73,9 @@ class QrexParser : public ExpressionParser {
   [[noreturn]] void Fail(std::string message) const;                    // at the current token
   // From an opening bracket to its matching closing one, which becomes the current token. Failure: `atEnd`.
   void SkipToMatching(int32_t open, int32_t close, std::string_view atEnd);
-  // The same for < >, failing with "Reached end of stream while scanning for matching >".
-  void SkipAngles();
+  // The same for < >, where `>>` closes two levels.
+  void SkipAngles(std::string_view atEnd = "Reached end of stream while scanning for matching >");
+  void SplitShiftRight();  // a current `>>` becomes its first half; the second is the next token
 
   // --- Names.
   NameSpaceElement* FindName(std::string_view name);  // the current name space, then the root
@@ -148,7 +149,6 @@ class QrexParser : public ExpressionParser {
   bool ParseDecoratorType(TypeCode& type, bool reflected);
   bool ParseSuffixedType(TypeCode& type, bool reflected);
   void ParseInnerType(TypeCode& type, bool reflected);
-  void ExpectCloseAngle();
   void CheckPlatformDependent() const;
   TypeCode ParseArraySuffix();
   void ParseArguments(FunctionSignature& signature, bool directionsRequired, bool polymorphicAllowed, bool reflected);

@@ -51,7 +51,7 @@ bool IsTokenEquivalent(const std::string& path, std::string_view text) {
   }
 }
 
-// The chain of imports that leads from `from` to `to`, both included; empty when there is none.
+// The chain of imports that leads from `from` to `to`, both included.
 std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const ScannedFile& to) {
   std::unordered_set<const ScannedFile*> seen{&from};
   struct Level {
@@ -121,8 +121,8 @@ bool ScannedFile::Import(LSFrame&, const std::string& path, const char*) {
   imported.WriteGeneratedFile();
 
   // A file in progress is not translated again, so a cycle shows as a chain from the import back to this file.
-  const std::vector<const ScannedFile*> chain = ImportChain(imported, *this);
-  if (!chain.empty()) {
+  if (&imported == this || imported.importClosure.Has(index)) {
+    const std::vector<const ScannedFile*> chain = ImportChain(imported, *this);
     TraceWriter trace;
     trace << "\nERROR: Cycle detected in import directives.  Files in cycle are...\n";
     trace << "    " << file.path << "\n";
@@ -131,6 +131,8 @@ bool ScannedFile::Import(LSFrame&, const std::string& path, const char*) {
   }
   frame.AddOrderedImport(imported.frame);
   imports.push_back(&imported);
+  importClosure.Add(imported.index);
+  importClosure.Add(imported.importClosure);
   importsIObject = importsIObject || imported.importsIObject;
   return true;
 }
@@ -159,6 +161,7 @@ void ScannedFile::WriteTranslation(const std::string& target) {
   unregisterNames.clear();
   typeRegistrations.clear();
   imports.clear();
+  importClosure = {};
   BufferStream generated;
   TranslateFile(*this, generated);
 

@@ -82,7 +82,8 @@ class ScannedFile : public ImportHandler {
   bool translated = false;
   bool hasDeclarations = false;
   const size_t index;           // in the build, for IndexSet
-  IndexSet mounted;             // the files whose declarations are visible here, this one excluded
+  IndexSet importClosure;       // the files that this one imports, directly or through others
+  IndexSet mounted;             // those whose @import was passed: their declarations are visible
   bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
   LSFileFrame frame;
   std::unique_ptr<NameSpace> rootNameSpace;

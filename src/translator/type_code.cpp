@@ -162,7 +162,7 @@ std::string MangledType(std::string_view code) {
     return name;
   }
   if (op == kOpArray) return "array" + std::to_string(ArraySize(code)) + "_" + MangledType(ArrayElement(code));
-  if (op == kOpMap) return "map_" + MangledType(MapKey(code)) + MangledType(MapValue(code));
+  if (op == kOpMap) return "map_" + MangledType(MapKey(code)) + "_" + MangledType(MapValue(code));
   const std::string inner = MangledType(code.substr(1));
   if (op == kOpPointer) return "ptr_" + inner;
   if (op == kOpReference) return "ref_" + inner;
@@ -179,22 +179,10 @@ std::string DestructorStem(std::string_view code) {
   if (op == kOpString8 || op == kOpString16) return std::string(kBuiltIns[op]);
   if (IsTemplate(op)) return std::string(ShortTemplate(op));
   if (!IsNamed(op)) return {};
-  const std::string_view last = LastPart(InlineName(code));
-  return last == "xstring" ? "basic_xstring" : std::string(last);
+  return std::string(LastPart(InlineName(code)));
 }
 
 }  // namespace
-
-std::string UsingText(std::string_view code) {
-  code = SkipMetadata(code);
-  const uint8_t op = Op(code);
-  if (IsNamed(op)) {
-    const std::string_view name = InlineName(code);
-    return name.find("::") == std::string_view::npos ? std::string() : "using " + std::string(name) + ";";
-  }
-  const std::string stem = DestructorStem(code);
-  return stem.empty() ? stem : "using vesk::" + stem + ";";
-}
 
 std::string QualifiedDestructorText(std::string_view code) {
   code = SkipMetadata(code);
@@ -203,12 +191,7 @@ std::string QualifiedDestructorText(std::string_view code) {
   const uint8_t op = Op(code);
   if (op == kOpString8 || op == kOpString16) return TypeText(code) + "::~basic_xstring";
   if (IsTemplate(op)) return "vesk::" + stem + "<" + TypeText(code.substr(1)) + ">::~" + stem;
-  return TypeText(code) + "::~" + stem;
-}
-
-std::string DestructorNameText(std::string_view code) {
-  const std::string stem = DestructorStem(SkipMetadata(code));
-  return stem.empty() ? stem : "~" + stem;
+  return TypeText(code) + "::~" + (IsNamed(op) && stem == "xstring" ? "basic_xstring" : stem);
 }
 
 }  // namespace qrex

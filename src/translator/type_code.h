@@ -107,10 +107,7 @@ void PrintType(TextWriter& out, std::string_view code);
 std::string TypeText(std::string_view code);
 void PrintDeclaration(TextWriter& out, std::string_view code, std::string_view name, DeclarationMode mode);
 std::string MangledType(std::string_view code);
-// The three destructor texts; empty for a type without a destructor.
-std::string UsingText(std::string_view code);
-std::string QualifiedDestructorText(std::string_view code);
-std::string DestructorNameText(std::string_view code);
+std::string QualifiedDestructorText(std::string_view code);  // "vesk::xset<T>::~xset"; empty for a type without one
 
 // --- Predicates. `root` is the root name space of the file of the element that holds the type.
 enum DecoratorBits : uint32_t {

@@ -59,16 +59,6 @@ void AppendInt32(std::string& out, uint32_t value) {
 
 }  // namespace
 
-// `>` or the first half of `>>`, which closes two levels: its second half is read as the next token.
-void QrexParser::ExpectCloseAngle() {
-  if (Is(kShiftRight)) {
-    current.text.begin += 1;
-    current.kind = kGreater;
-    return;
-  }
-  Expect(kGreater, ">");
-}
-
 void QrexParser::ParseInnerType(TypeCode& type, bool reflected) {
   NestingGuard guard(*this);
   if (!ParseTypeWithName(type, nullptr, false, nullptr, reflected)) Fail("Syntax error : " + Printed(current));
@@ -94,7 +84,8 @@ bool QrexParser::ParseDecoratorType(TypeCode& type, bool reflected) {
     ParseInnerType(type, reflected);
     Expect(kComma, ",");
     ParseInnerType(type, reflected);
-    ExpectCloseAngle();
+    SplitShiftRight();
+    Expect(kGreater, ">");
     return true;
   }
   for (const TemplateName& name : kTemplateNames) {
@@ -106,7 +97,8 @@ bool QrexParser::ParseDecoratorType(TypeCode& type, bool reflected) {
     Expect(kLess, "<");
     type += name.ops;
     ParseInnerType(type, reflected);
-    ExpectCloseAngle();
+    SplitShiftRight();
+    Expect(kGreater, ">");
     return true;
   }
   return false;
@@ -348,8 +340,8 @@ void QrexParser::ParseFunctionSignature(FunctionSignature& signature, bool const
 
 void QrexParser::ParseMethodOrAttribute(bool constAllowed, bool& isAttribute, FunctionSignature& signature, bool ipc,
                                         bool reflected) {
-  const char* const position = current.text.begin;
   signature.isInline = AcceptWord("inline");
+  const char* const position = current.text.begin;
   bool followedByParen = false;
   if (!ParseTypeWithName(signature.returnType, &signature.name, true, &followedByParen, reflected)) {
     Fail("Type expected when read " + Printed(current));
