@@ -5,18 +5,164 @@
 namespace qrex {
 namespace {
 
-class LoopTest : public TranslateTest {};
+class LoopTest : public TranslateTest {
+ protected:
+  std::string SourceOf(const std::string& name, int64_t generatedLine) {
+    std::string path;
+    int64_t line = 0;
+    if (!Scanned(name).MapGeneratedLine(generatedLine, path, line)) return "none";
+    return path + ":" + std::to_string(line);
+  }
+};
 
 TEST_F(LoopTest, CopiesPlainText) {
   const std::string text = "// a comment\n\n#include <vector>\nint f() { return 1; /* } */ }\n\tusing namespace std;\n";
   EXPECT_EQ(text, Translate("a.cpp", text));
+  EXPECT_EQ("", Translate("b.cpp", ""));
+  EXPECT_EQ("int x = '$' ? 1 : 0; // $struct\nconst char* s = \"$class }\";",
+            Translate("c.c", "int x = '$' ? 1 : 0; // $struct\nconst char* s = \"$class }\";"));
+}
+
+TEST_F(LoopTest, WrapsHeaders) {
+  EXPECT_EQ(
+      "#pragma once\n#ifndef _app_src_sub_dir_my_file2_h\n#define _app_src_sub_dir_my_file2_h\n\nint x;"
+      "\n#endif // include guard\n",
+      Translate("src/sub-dir/my.file2.h", "int x;"));
+}
+
+TEST_F(LoopTest, ImportsBecomeIncludes) {
+  AddFile("a.h", "int a;\n");
+  AddFile("api/b.h", "int b;\n");
+  EXPECT_EQ(
+      "int x;\n  #include \"a.h\" // first\n#include \"api/b.h\"\n#include <map>\n#include \"other.h\"\n",
+      Translate("t.cpp",
+                "int x;\n  @import \"a.h\" // first\n@import \"api/b.h\"\n#include <map>\n#include \"other.h\"\n"));
+  EXPECT_EQ("t2.cpp(2) : error : #include should be replaced by @import",
+            ErrorOf("t2.cpp", "int x;\n#include \"a.h\"\n"));
+  EXPECT_EQ("t3.cpp(1) : error : Can't import file: none.h", ErrorOf("t3.cpp", "@import \"none.h\"\n"));
+  EXPECT_EQ("#include \"a.h\"\n", Translate("t.asm", "#include \"a.h\"\n"));
+}
+
+// A project that is not translated may be included as it is.
+TEST_F(LoopTest, IncludesOfPlainProjects) {
+  AddProject("plain", "plain", TargetType::StaticLibrary).usesQrex = false;
+  AddFileTo(*workspace->projects[2], "plain/p.h", "int p;\n");
+  EXPECT_EQ("#include \"plain/p.h\"\n", Translate("t.cpp", "#include \"plain/p.h\"\n"));
+  EXPECT_EQ("error : File plain/p.h is not part of a project using qrex", ErrorOf("u.cpp", "@import \"plain/p.h\"\n"));
+}
+
+TEST_F(LoopTest, ImportCycles) {
+  AddFile("a.h", "@import \"b.h\"\n");
+  AddFile("b.h", "int b;\n@import \"a.h\"\n");
+  EXPECT_EQ("a.h(1) : error : Can't import file: b.h", ErrorOf("t.cpp", "@import \"a.h\"\n"));
+  EXPECT_EQ("\nERROR: Cycle detected in import directives.  Files in cycle are...\n    a.h\n    b.h\n", Messages());
+  EXPECT_EQ("self.h(1) : error : Can't import file: self.h", ErrorOf("self.h", "@import \"self.h\"\n"));
+}
+
+TEST_F(LoopTest, NameSpacesAndBraces) {
+  const Generated generated = TranslateHeader(
+      "namespace a {\nnamespace b\n{ int f() { return 1; }\n$enum+ E { x };\n}\n$enum+ F { y };\n} using namespace a;\n"
+      "namespace { $enum+ G { z }; }\nusing std::swap;\n");
+  EXPECT_NE(std::string::npos, generated.tail.find("//### $enum+ a::F\n"));
+  EXPECT_NE(std::string::npos, generated.tail.find("//### $enum+ a::b::E\n"));
+  EXPECT_NE(std::string::npos, generated.tail.find("namespace \n{\n    vesk::ReflectedEnum const& _GetReflected(G"));
+}
+
+TEST_F(LoopTest, DollarNew) {
+  EXPECT_EQ("p = vesk::DollarNew(new a::b<c>(d));\nq = vesk::DollarNew(new  T );{}",
+            Translate("t.cpp", "p = $new a::b<c>(d);\nq = $new  T ;{}"));
+  EXPECT_EQ("vesk::DollarNew(new V<W<int>>(f(1), \")\")(2)), vesk::DollarNew(new X);",
+            Translate("u.cpp", "$new V<W<int>>(f(1), \")\")(2), $new X;"));
+}
+
+TEST_F(LoopTest, InitAndUninit) {
+  EXPECT_EQ(
+      "void _Register_app0()\n{ a(); }\nnamespace n { void _Register_app1()\n{}\n}\n"
+      "void _Unregister_app0()\n{ b(); }\n"
+      "\n\nvoid _Register_app0(); \nnamespace n { void _Register_app1(); }\n\n"
+      "void Register_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
+      "    s_called = true;\n    _Register_app0();\n    n::_Register_app1();\n}\n"
+      "\n\nvoid _Unregister_app0(); \n\n"
+      "void Unregister_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
+      "    s_called = true;\n    _Unregister_app0();\n}\n",
+      Translate("app.cpp", "$init { a(); }\nnamespace n { $init {}\n}\n$uninit { b(); }\n"));
 }
 
 TEST_F(LoopTest, ErrorsOfDirectives) {
   AssertErrors({
       {"\n}", "(2) : error : Can't match }"},
-      {"$bogus x;", "(1) : error : '$bogus' is not a valid directive"},
+      {"{ }\n}", "(2) : error : Can't match }"},
+      {"\n$bogus x;", "(2) : error : '$bogus' is not a valid directive"},
+      {"$schema x;", "(1) : error : '$schema' is not a valid directive"},
+      {"namespace 1 {", "(1) : error : Expected identifier after namespace when read 1"},
+      {"namespace a\n;", "(2) : error : Expected { after a when read ;"},
+      {"$enum e { x };\nnamespace e { }", "(2) : error : Can't open namespace e : $enum e is not a namespace"},
+      {"$new 1;", "(1) : error : Expected identifier after new when read 1"},
+      {"$new a::\n;", "(2) : error : Expected identifier after :: when read ;"},
+      {"$new a<", "(1) : error : Reached end of stream while scanning for matching >"},
+      {"$new a(", "(1) : error : Reached end of stream while scanning for matching )"},
+      {"$init x", "(1) : error : Expected { after init when read x"},
+      {"$uninit\n\nx", "(3) : error : Expected { after uninit when read x"},
+      {"$makefunctor nothing f { }", "(1) : error : Unrecognised identifier : nothing"},
+      {"$enum e { x }; $makefunctor\ne f { }", "(2) : error : Expected functor identifier after e when read f"},
   });
+}
+
+// Errors in expanded text are told at the source that it came from.
+TEST_F(LoopTest, PositionsThroughMacros) {
+  EXPECT_EQ("t.h(4) : error : '$bogus' is not a valid directive", ErrorOf("t.h", "@def mac = x\n\n\n$bogus mac\nmac"));
+  EXPECT_EQ("u.h(1) : error : Can't match }", ErrorOf("u.h", "@def shut = }\n\nshut\n"));
+}
+
+TEST_F(LoopTest, LineTable) {
+  const std::string generated =
+      Translate("t.h", "int a;\n@import \"Vesk/vxObject/IObject.h\"\n\n$struct S\n{\n};\nint b;\n");
+  const size_t b =
+      static_cast<size_t>(std::count(generated.begin(), generated.begin() + generated.find("int b"), '\n'));
+  const std::string path = "app/src/t.h";
+  EXPECT_EQ("none", SourceOf("t.h", 4));
+  EXPECT_EQ(path + ":1", SourceOf("t.h", 5));
+  EXPECT_EQ(path + ":2", SourceOf("t.h", 6));
+  EXPECT_EQ(path + ":4", SourceOf("t.h", 8)) << "generated text stands at the declaration";
+  EXPECT_EQ(path + ":7", SourceOf("t.h", static_cast<int64_t>(b) + 1));
+  EXPECT_EQ(path + ":7", SourceOf("t.h", 10000));
+  AddFile("never.h", "");
+  EXPECT_EQ("none", SourceOf("never.h", 5));
+  EXPECT_EQ("\nNOTE: Need @import instead of #include \"never.h\" to pinpoint errors in original source files\n",
+            Messages());
+}
+
+TEST_F(LoopTest, LineTableOfEmptyFile) {
+  Translate("t.cpp", "");
+  EXPECT_EQ("none", SourceOf("t.cpp", 1));
+  EXPECT_EQ("\nINTERNAL ERROR: convert error position failed because line number invalid\n", Messages());
+}
+
+TEST_F(LoopTest, PredefinedVariables) {
+  MakeWorld(TargetType::DynamicLinkLibrary);
+  settings.systemProcessor = "x86";
+  settings.systemVersion = "6";
+  settings.sizeofPointer = "8";
+  const std::string text =
+      "@is_public_header @is_header @is_cpp @root_to_file_path @filename @filename_without_extension @file_extension "
+      "@workspace @project @root_to_projdir_path @platform @system_name @system_processor @system_version "
+      "@size_of_pointer @config @api @target_type";
+  EXPECT_EQ(
+      "false false false app/src/t.py t.py t py tree app app x64 Linux x86 6 8 Debug app_API Dynamic-Link Library",
+      Translate("t.py", text));
+  EXPECT_EQ("false false true", Translate("u.cpp", "@is_public_header @is_header @is_cpp"));
+  EXPECT_NE(std::string::npos, Translate("pub/v.h", "@is_public_header @is_header @is_cpp").find("true true false"));
+  EXPECT_EQ(app().rootDir + "/app/src/w.py " + app().rootDir, Translate("w.py", "@file_path @root_path"));
+}
+
+TEST_F(LoopTest, CompilerMacros) {
+  const std::string text = "@macros [@macroA] [@macroB] [@macroC]";
+  app().configs.front()->compilerText = "-O2 -DA  -D\"B\" -Wall";
+  EXPECT_EQ("A \"B\" [] [] [@macroC]", Translate("t.py", text));
+  settings.compiler = CompilerKind::vc10;
+  MakeWorld(TargetType::Application);
+  app().configs.front()->compilerOptions["PreprocessorDefinitions"] = "A;C";
+  EXPECT_EQ("A;C [] [@macroB] []", Translate("t.py", text));
 }
 
 }  // namespace

@@ -38,7 +38,9 @@ class TestHost : public TranslationHost {
     if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
     return *slot;
   }
-  std::string TranslatedPath(const ScannedFile& file) const override { return "translated/" + file.file.path; }
+  std::string TranslatedPath(const ScannedFile& file) const override {
+    return file.file.project->rootDir + "/translated/" + file.file.path;
+  }
   bool RegisterGuid(const guid& id, const std::string& owner, std::string& existing) override {
     auto [entry, isNew] = m_guids.emplace(id, owner);
     existing = entry->second;
@@ -237,6 +239,7 @@ class TranslateTest : public ::testing::Test, public TraceHook {
   }
 
   void AddFileTo(Project& project, const std::string& path, const std::string& text) {
+    ASSERT_FALSE(project.filesByPath.count(path)) << path << " is there already: use a new world";
     auto file = std::make_unique<ProjectFile>();
     file->project = &project;
     file->path = path;

@@ -1,0 +1,574 @@
+// Class statements: whole headers and tails, each variation of the head and the members, and all that may be wrong.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class ClassesTest : public TranslateTest {
+ protected:
+  // The text around a definition's name and body in a header, without the traits ahead of it.
+  std::string ClassText(const std::string& text) {
+    std::string header = TranslateHeader(text).header;
+    const size_t traits = header.rfind("} // namespace vesk\n");
+    return traits == std::string::npos ? header : header.substr(traits + 20);
+  }
+  static std::string Traits(const std::string& keyword, const std::string& name, const std::string& flags,
+                            const std::string& classFlags) {
+    static constexpr std::string_view kFlags[] = {"is_exported", "is_reflected", "is_registered"};
+    static constexpr std::string_view kClassFlags[] = {"has_reflected_default_ctor",
+                                                       "has_reflected_dtor",
+                                                       "has_reflected_copy_ctor",
+                                                       "has_reflected_equality",
+                                                       "has_reflected_compare",
+                                                       "has_reflected_write_xostream",
+                                                       "has_reflected_serialise",
+                                                       "has_reflected_visit_IObjects",
+                                                       "has_reflected_visit_Prefs",
+                                                       "implements_IObject",
+                                                       "implements_IPersistable",
+                                                       "can_serialise_model",
+                                                       "has_model",
+                                                       "using_model_base_class"};
+    auto line = [](std::string_view flag, char value) {
+      return "    static const bool " + std::string(flag) + " = " + value + ";\n";
+    };
+    std::string text = "namespace vesk\n{\ntemplate<> struct TypeTraits<" + name + ">\n{\n";
+    for (size_t i = 0; i < std::size(kFlags); ++i) text += line(kFlags[i], flags[i]);
+    text += "    static const vesk::ETypeTraitKind kind = vesk::TTK_" + keyword + ";\n";
+    text += line("has_metadata", flags[3]) + "};\ntemplate<> struct ClassTypeTraits<" + name + ">\n{\n";
+    for (size_t i = 0; i < std::size(kClassFlags); ++i) text += line(kClassFlags[i], classFlags[i]);
+    return text + "};\n";
+  }
+};
+
+TEST_F(ClassesTest, WholeHeaderAndTail) {
+  MakeWorld(TargetType::DynamicLinkLibrary);
+  AssertGenerated(
+      R"($class Late;
+$class+ Later isa vesk::IObject;
+namespace geo
+{
+$struct Point
+{
+    int x;
+    $int32 y;
+};
+$class+ Shape isa vesk::IObject : Base,private other::Base<int> : [ 7, "meta" ]
+{
+public:
+    Shape() : m_count(0) { }
+    $string8 name : [ colour(1) ];
+    $xvector<const Point*> points[2];
+    $Point const* at(int32 i, Late& late) const { return 0; }
+    $void clear();
+private:
+    int m_count;
+};
+$class Pair<typename T, int N> <<reflect>>
+{
+public:
+    $int32 count;
+    T items[N];
+};
+}
+)",
+      R"(class Late;
+
+class app_API Later;
+app_API vesk::ReflectedClass const& _GetReflected(Later const*);
+app_API vesk::TypeOps const& _GetTypeOps(Later const*);
+
+namespace geo
+{
+struct Point;
+
+} //geo
+)" + Traits("struct", "geo::Point", "0000", "00000000000000") +
+          R"(} // namespace vesk
+namespace geo
+{
+struct Point
+{
+    int x;
+    vesk::int32 y;
+
+public:
+    vesk::int32 Gety() const { return y; }
+    void Sety(vesk::int32 _v) { y = _v; }
+    
+};
+
+
+class Shape;
+
+} //geo
+)" + Traits("class", "geo::Shape", "1111", "11100000010000") +
+          R"(template<> struct directly_implements_interface<geo::Shape,vesk::IObject> { static const bool value = true; };
+} // namespace vesk
+namespace geo
+{
+class app_API Shape : public vesk::IObjectBaseMixin<Shape,vesk::EmptyBase>,Base,private other::Base<int>
+
+{
+public:
+    typedef vesk::IObjectBaseMixin<Shape,vesk::EmptyBase> BaseClass;
+
+public:
+    Shape() : m_count(0) { }
+    vesk::string8 name;
+    vesk::Array<vesk::xvector<geo::Point const*>,2> points;
+    Point const* at(int32 i, Late& late) const { return 0; }
+    void clear();
+private:
+    int m_count;
+
+public:
+    vesk::string8 Getname() const { return name; }
+    void Setname(vesk::string8 _v) { name = _v; }
+    vesk::Array<vesk::xvector<geo::Point const*>,2> Getpoints() const { return points; }
+    void Setpoints(vesk::Array<vesk::xvector<geo::Point const*>,2> _v) { points = _v; }
+    
+    static vesk::ptr<vesk::IObject> __stdcall sfnCreateInstance();
+    friend app_API vesk::ReflectedClass const& _GetReflected(Shape const*);
+    vesk::AnyInterface QueryInterface(const vesk::ReflectedInterface&);
+    vesk::ReflectedClass const* GetReflectedClass() const;
+};
+
+app_API vesk::ReflectedClass const& _GetReflected(Shape const*);
+app_API vesk::TypeOps const& _GetTypeOps(Shape const*);
+
+inline geo::Point const* __stdcall at(Shape const* _self,vesk::int32 i,Late& late) { return _self->at(i,late); }
+inline void __stdcall clear(Shape* _self) { _self->clear(); }
+template <typename T, int N>
+class Pair
+{
+public:
+    vesk::int32 count;
+    T items[N];
+
+public:
+    vesk::int32 Getcount() const { return count; }
+    void Setcount(vesk::int32 _v) { count = _v; }
+    
+    friend vesk::ReflectedClass const& _GetReflected(Pair const*)
+    {
+        static const vesk::octet_t Pair_count[] =
+        {
+            0x04
+        };
+        static const vesk::ReflectedField Pair_fields[] =
+        {
+            { "count", offsetof(Pair,count), Pair_count },
+        };
+        static const vesk::ReflectedClass Pair_class =
+        {
+            1,
+            "geo::Pair",
+            sizeof(Pair<T,N>),
+            0,
+            Pair_fields,1,
+            0,0,
+            0,0,
+            0,0,
+            0,
+            0,0,0,
+            0,
+            0,
+            {
+                sizeof(Pair),
+                0,
+                0,
+                0,
+                (vesk::ConstructArrayFn) (void (*)( Pair*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<Pair>,
+                (vesk::CopyConstructArrayFn) (void (*)(Pair*, vesk::ssize_t, Pair const*, vesk::ssize_t, vesk::ssize_t)) vesk::CopyConstructArray<Pair>,
+                (vesk::AssignArrayFn) (void (*)(Pair*, vesk::ssize_t, Pair const*, vesk::ssize_t, vesk::ssize_t)) vesk::AssignArray<Pair>,
+                (vesk::DestructArrayFn) (void (*)( Pair*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<Pair>,
+                0,
+                0,
+                0,
+                0,
+                0,
+                0
+            }
+        };
+        
+        return Pair_class;
+    }
+};
+
+template <typename T, int N> vesk::TypeOps const& _GetTypeOps(Pair<T,N> const*)
+{
+    return vesk::GetReflectedClass<Pair<T,N>>().m_ops;
+}
+
+}
+)",
+      R"(
+//### $class geo::Pair
+namespace vesk { XTarget* app_GetXTarget(); }
+namespace geo
+{
+} // geo
+
+//### $class+ geo::Shape
+namespace vesk { XTarget* app_GetXTarget(); }
+namespace geo
+{
+    vesk::ptr<vesk::IObject> __stdcall Shape::sfnCreateInstance()
+    {
+        return static_cast<vesk::ptr<vesk::IObject> >(new Shape());
+    }
+    app_API vesk::ReflectedClass const& _GetReflected(Shape const*)
+    {
+        static const vesk::octet_t Shape_metadata[] =
+        {
+            0xe2,0xa2,0x07,0x00,0x00,0x00,0xa4,0x00,0x00
+        };
+        static const vesk::octet_t Shape_name[] =
+        {
+            0xe1,0xc1,0x01,0x00,0xa2,0x01,0x00,0x00,0x00,0x10
+        };
+        static const vesk::octet_t Shape_points[] =
+        {
+            0x50,0x02,0x00,0x00,0x00,0x44,0x35,0x31,0x20,0x02,0x00
+        };
+        static const vesk::ReflectedField Shape_fields[] =
+        {
+            { "name", offsetof(Shape,name), Shape_name },
+            { "points", offsetof(Shape,points), Shape_points },
+        };
+        static const vesk::octet_t Shape_at_return[] =
+        {
+            0x35,0x31,0x20,0x02,0x00
+        };
+        static const vesk::octet_t Shape_at_i[] =
+        {
+            0x04
+        };
+        static const vesk::octet_t Shape_at_late[] =
+        {
+            0x36,0x20,0x03,0x00
+        };
+        static const vesk::ReflectedArg Shape_at_args[] =
+        {
+            { "i", Shape_at_i },
+            { "late", Shape_at_late },
+        };
+        static const vesk::ReflectedClassMethod Shape_methods[] =
+        {
+            {"at",{Shape_at_return},Shape_at_args,2,0,true,(vesk::FunctionPointer)(geo::Point const* (__stdcall *)(Shape const* _self,vesk::int32 i,Late& late))&geo::at},
+            {"clear",{0},0,0,0,false,(vesk::FunctionPointer)(void (__stdcall *)(Shape* _self))&geo::clear},
+        };
+        static vesk::ConstStringZ Shape_stringTable[] =
+        {
+            "meta",
+            "colour",
+            "geo::Point",
+            "Late",
+        };
+        static vesk::ConstStringZ Shape_interfaces[] =
+        {
+            "vesk::IObject",
+        };
+        static const vesk::ReflectedClass Shape_class =
+        {
+            1,
+            "geo::Shape",
+            sizeof(Shape),
+            Shape_metadata,
+            Shape_fields,2,
+            0,0,
+            0,0,
+            Shape_methods,2,
+            Shape_stringTable,
+            Shape_interfaces,0,1,
+            &vesk::IObject::Stubs<Shape>::GetTable(),
+            &Shape::sfnCreateInstance,
+            {
+                sizeof(Shape),
+                0,
+                0,
+                0,
+                (vesk::ConstructArrayFn) (void (*)( Shape*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<Shape>,
+                (vesk::CopyConstructArrayFn) (void (*)(Shape*, vesk::ssize_t, Shape const*, vesk::ssize_t, vesk::ssize_t)) vesk::CopyConstructArray<Shape>,
+                (vesk::AssignArrayFn) (void (*)(Shape*, vesk::ssize_t, Shape const*, vesk::ssize_t, vesk::ssize_t)) vesk::AssignArray<Shape>,
+                (vesk::DestructArrayFn) (void (*)( Shape*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<Shape>,
+                0,
+                0,
+                0,
+                0,
+                0,
+                0
+            }
+        };
+        
+        return Shape_class;
+    }
+    app_API vesk::TypeOps const& _GetTypeOps(Shape const*)
+    {
+        return vesk::GetReflectedClass<Shape>().m_ops;
+    }
+    
+    vesk::AnyInterface geo::Shape::QueryInterface(const vesk::ReflectedInterface& _ri)
+    {
+        if (&_ri == &vesk::GetReflectedInterface<vesk::IObject >()) { vesk::ptr<vesk::IObject> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
+        return vesk::AnyInterface();
+    }
+    vesk::ReflectedClass const* geo::Shape::GetReflectedClass() const
+    {
+        return &_GetReflected( (geo::Shape*) 0);
+    }
+    
+    // Registration of $class+ geo::Shape
+    void _Register_Shape()
+    {
+        vxVerify(vesk::RegisterReflectedClass(&_GetReflected( (Shape*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);
+    }
+} // geo
+)");
+  EXPECT_EQ(
+      "t.h(3) : warning W1008 : $class+ Later doesn't appear in public header of library\n"
+      "t.h(11) : warning W1008 : $class+ geo::Shape doesn't appear in public header of library\n"
+      "t.h(11) : warning W1002 : Reflected $class+ geo::Shape references non-registered $struct geo::Point\n"
+      "t.h(6) : see declaration of $struct geo::Point\n",
+      Messages());
+}
+
+// The heads of definitions: what stands between `struct` and the body.
+TEST_F(ClassesTest, Heads) {
+  const std::pair<std::string, std::string> cases[] = {
+      {"$struct A { };", "struct A\n{"},
+      {"$struct A final { };", "struct A final\n{"},
+      {"$class A : public B, virtual_base::C<x> { };", "class A : public B, virtual_base::C<x>\n\n{"},
+      {"$class A isa vesk::IObject { };",
+       "class A : public vesk::IObjectBaseMixin<A,vesk::EmptyBase>\n{\npublic:\n"
+       "    typedef vesk::IObjectBaseMixin<A,vesk::EmptyBase> BaseClass;\n"},
+      {"$struct A isa vesk::IPersistable : B { };",
+       "struct A : public vesk::PersistableMixin<vesk::IObjectBaseMixin<A,vesk::EmptyBase>>,B\n\n{\n    typedef "},
+      {"$struct A<class T> isa vesk::IObject { };",
+       "template <class T>\nstruct A : public vesk::IObjectBaseMixin<A<T>,vesk::EmptyBase>\n{\n    typedef "},
+      {"$struct A : mixin [ ] { };", "struct A : public vesk::BaseMixin<A,vesk::EmptyBase>\n{\n    typedef "},
+      {"$struct A : B mixin [ ? M] C, D { };",
+       "struct A : public M<vesk::BaseMixin<A,A__BASE> >\n,C, D\n{\n    typedef "},
+      {"$struct A : [ 1 ] { };", "struct A\n{"},
+      {"$mixin M { };", "template <typename BC>\nstruct M : public BC\n{\n    typedef BC BaseClass;\n"},
+      {"$mixin M<int N, class T> : B { };",
+       "template <typename BC,int N, class T>\nstruct M : public BC,B\n\n{\n    typedef BC BaseClass;\n"},
+      {"$mixin M : B mixin [ ] { };",
+       "template <typename BC>\nstruct M__BASE : BC,B {};\ntemplate <typename BC>\nstruct M : public M__BASE<BC>\n\n{"},
+  };
+  for (const auto& [text, head] : cases) EXPECT_EQ(head, ClassText(text).substr(0, head.size())) << text;
+}
+
+TEST_F(ClassesTest, ForwardAndDeferred) {
+  const std::pair<std::string, std::string> cases[] = {
+      {"$class A; $class A;", "class A; class A;\n"},
+      {"$model A; $adt B;", "struct A; struct B;\n"},
+      {"$mixin M; $mixin M2<int N>;", "template <typename BC> struct M; template <typename BC,int N> struct M2;\n"},
+      {"$struct A<class T>;", "template <class T> struct A;\n"},
+      {"$struct A <<os>>;",
+       "struct A;\n\ninline vesk::xostream& operator<<(vesk::xostream& _os,A const& _x) "
+       "{ ((A&)_x).Write(_os); return _os; }\n"},
+      {"$struct+ A <<extern>>;",
+       "vesk::ReflectedClass const& _GetReflected(A const*);\nvesk::TypeOps const& _GetTypeOps(A const*);\n"},
+  };
+  for (auto [text, header] : cases) {
+    header.erase(std::remove(header.begin(), header.end(), '\n'), header.end());
+    std::string actual = TranslateHeader(text).header;
+    actual.erase(std::remove(actual.begin(), actual.end(), '\n'), actual.end());
+    EXPECT_EQ(header, actual) << text;
+  }
+  // A definition behind a deferred declaration doesn't declare the record functions again.
+  const std::string header = TranslateHeader("$struct+ A <<os>>; $struct+ A { };").header;
+  EXPECT_EQ(header.find("_GetTypeOps(A const*);"), header.rfind("_GetTypeOps(A const*);"));
+}
+
+TEST_F(ClassesTest, Bodies) {
+  const std::pair<std::string, std::string> cases[] = {
+      {"$$() { $$ * p; if (x) { } }", "A() { A * p; if (x) { } }\n"},
+      {"void f() { g($this, $this); h($new B(1)); }",
+       "void f() { g(this->GetThisAsFinalClass(), this->GetThisAsFinalClass()); h(vesk::DollarNew(new B(1))); }\n"},
+      {"$std::map<int,int> m; /* $ } */", "std::map<int,int> m; /* $ } */\n"},
+      {"$int f(int a) const { return \"}\"[a]; } $void g();", "int f(int a) const { return \"}\"[a]; } void g();\n"},
+  };
+  for (const auto& [body, expected] : cases) {
+    const std::string text = ClassText("$struct A\n{" + body + "};");
+    const std::string head = "struct A\n{";
+    EXPECT_EQ(head + expected, text.substr(0, head.size() + expected.size())) << body;
+  }
+}
+
+TEST_F(ClassesTest, NestedClasses) {
+  const std::string header = ClassText(
+      "$struct A\n{\n    $class B;\n    $struct C <<os>>\n    {\n        $int32 x;\n        $class D { };\n    "
+      "};\n};\n");
+  EXPECT_EQ(
+      "struct A\n{\n    class B;\n\n    struct C\n{\n        vesk::int32 x;\n        class D\n{ \npublic:\n    "
+      "\n};\n\n\n"
+      "    \npublic:\n    vesk::int32 Getx() const { return x; }\n    void Setx(vesk::int32 _v) { x = _v; }\n    "
+      "\n};\n\n\n"
+      "inline vesk::xostream& operator<<(vesk::xostream& _os,C const& _x) { ((C&)_x).Write(_os); return _os; }\n\n"
+      "\npublic:\n    \n};\n\n\n",
+      header);
+}
+
+// The body of an external class is dropped; only its reflection data is written.
+TEST_F(ClassesTest, ExternalClass) {
+  const Generated generated =
+      TranslateHeader("$struct+ A <<extern -traits>>\n{\n    int y;\n    $int32 x; $void f(); };\n");
+  EXPECT_EQ(
+      "\nvesk::ReflectedClass const& _GetReflected(A const*);\nvesk::TypeOps const& _GetTypeOps(A const*);\n"
+      "\ninline void __stdcall f(A* _self) { _self->f(); }\n",
+      generated.header);
+  EXPECT_NE(std::string::npos, generated.tail.find("{ \"x\", offsetof(A,x), A_x },\n"));
+  EXPECT_NE(std::string::npos, generated.tail.find("    void _Register_A()\n"));
+}
+
+TEST_F(ClassesTest, Operators) {
+  const Generated generated = TranslateHeader("$struct A<class T> <<os ar>> { $T* f(T t, xmap<T,T> m); };");
+  EXPECT_NE(std::string::npos,
+            generated.header.find(
+                "};\n\n"
+                "template <class T> \ntemplate<typename Archive> inline void Serialise(Archive& _ar,A<T> const& _x) "
+                "{ _x.Serialise(_ar); }\n"
+                "template <class T> \ntemplate<typename Archive> inline void Deserialise(Archive& _ar,A<T>& _x) "
+                "{ _x.Deserialise(_ar); }\n"
+                "\ntemplate <class T> inline vesk::xostream& operator<<(vesk::xostream& _os,A<T> const& _x) "
+                "{ ((A<T>&)_x).Write(_os); return _os; }\n"
+                "\ninline T* __stdcall f(A* _self,T t,vesk::xmap<T,T > m) { return _self->f(t,m); }"))
+      << generated.header;
+}
+
+TEST_F(ClassesTest, RecordsOfQualifiers) {
+  // The flags of the record, and the functions of its TypeOps.
+  auto flagsAndOps = [&](const std::string& text) {
+    const std::string tail = TranslateHeader(text).tail;
+    std::vector<std::string> lines;
+    SplitString(tail.substr(tail.find("_class =\n")), lines, "\n");
+    std::string result = lines[2].substr(lines[2].find_first_not_of(' '), lines[2].find(',') - 12);
+    for (size_t i = 3; lines[i].find("return") == std::string::npos; ++i) {
+      if (lines[i].find("Fn) (") == std::string::npos) continue;
+      const size_t name = lines[i].rfind(" vesk::") + 7;
+      result += " " + lines[i].substr(name, lines[i].find('<', name) - name);
+    }
+    return result;
+  };
+  const std::string all = " ConstructArray CopyConstructArray AssignArray DestructArray";
+  const std::pair<std::string, std::string> cases[] = {
+      {"$struct+ A { };", "0" + all},
+      {"$class+ A <<passbyvalue returnbyvalue rod>> { };", "225" + all},
+      {"$struct A <<reflect>> { };", "0" + all},
+      {"$struct+ A <<-dc -copy>> { };", "0 DestructArray"},
+      {"$struct+ A <<abstract compare print ser copy dc>> { };",
+       "0 VariableEqual VariableLess BinaryLowerBound BinaryUpperBound"},
+      {"$struct+ A <<os ser -copy>> { };",
+       "0 PrintVariable ConstructArray DestructArray SerialiseArray DeserialiseArray"},
+      {"$struct+ A <<os -print>> { };", "0" + all},
+      {"$adt A { void f(); }; $adt implement A <<reflect>> { void f() { } };", "16"},
+  };
+  for (const auto& [text, expected] : cases) EXPECT_EQ(expected, flagsAndOps(text)) << text;
+}
+
+TEST_F(ClassesTest, InterfacesOfRecords) {
+  const Generated generated = TranslateHeader(
+      "$interface+ I : vesk::IPersistable { }; $interface J : vesk::IObject { };\n"
+      "$warning(disable: 1013) $struct A isa J, I { };");
+  EXPECT_NE(
+      std::string::npos,
+      generated.header.find(
+          "template<> struct directly_implements_interface<A,J> { static const bool value = true; };\n"
+          "template<> struct directly_implements_interface<A,I> { static const bool value = true; };\n"
+          "template<> struct indirectly_implements_interface<A,vesk::IObject> { static const bool value = true; };\n"
+          "template<> struct indirectly_implements_interface<A,vesk::IPersistable> "
+          "{ static const bool value = true; };\n"))
+      << generated.header;
+  EXPECT_NE(std::string::npos, generated.tail.find("return static_cast<vesk::ptr<J> >(new A());\n"));
+  EXPECT_NE(std::string::npos, generated.tail.find("A_interfaces,3,2,\n")) << generated.tail;
+  EXPECT_EQ(std::string::npos, generated.tail.find("GetReflectedInterface<J")) << "not reflected";
+}
+
+// The methods of an adt are free functions, and its record carries their metadata.
+TEST_F(ClassesTest, AbstractDataTypes) {
+  MakeWorld(TargetType::DynamicLinkLibrary);
+  const Generated generated = TranslateHeader(
+      "$adt+ A : [ 1 ]\n{\n    int32 f(string8 s) const : [ 2 ];\n    void g();\n};\n"
+      "$class K { };\n$adt implement A\n{\n};\n");
+  EXPECT_NE(std::string::npos,
+            generated.header.find("struct A;\n"
+                                  "app_API vesk::ReflectedClass const& _GetReflected(A const*);\n"
+                                  "app_API vesk::TypeOps const& _GetTypeOps(A const*);\n"
+                                  "\napp_API vesk::int32 __stdcall f(A const* _self,vesk::string8 s);\n"
+                                  "\napp_API void __stdcall g(A* _self);\n\nnamespace vesk\n"))
+      << generated.header;
+}
+
+TEST_F(ClassesTest, Errors) {
+  EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$struct A { };"));
+  AssertErrors({
+      // the heading
+      {"$mixin+\nM { };", "(2) : error : '+' modifier not permitted on $mixin"},
+      {"$struct A { $class+ B { }; };", "(1) : error : '+' modifier not permitted on nested classes or structs"},
+      {"$struct implement A { };", "(1) : error : 'implement' modifier only permitted on $adt"},
+      {"$struct 1", "(1) : error : Expected identifier after struct when read 1"},
+      {"\n$adt implement A { };", "(2) : error : Can't implement undefined $adt A"},
+      {"$adt A; $adt implement A { };", "(1) : error : Can't implement undefined $adt A"},
+      {"$adt A { }; $adt implement A { }; $adt implement A { };", "(1) : error : Repeated implementation of $adt A"},
+      {"$adt A { }; $adt implement A;", "(1) : error : Forward declaration of $adt A incompatible with 'implements'"},
+      {"$adt A { }; $adt implement A <<os>>;",
+       "(1) : error : Forward declaration of $adt A incompatible with 'implements'"},
+      {"$adt A { }; $adt A { };", "(1) : error : Repeated definition of $adt A"},
+      {"$adt A { } $", "(1) : error : ; expected after definition of $adt A when read $"},
+      {"$adt A : { };", "(1) : error : Expected [ after : when read {"},
+      {"$adt A int32", "(1) : error : Expected { after A when read int32"},
+      {"$adt A { int32 f();", "(1) : error : Met EOS before read matching brace"},
+      {"$model A : x { };", "(1) : error : Expected [ after : when read x"},
+      {"$struct A<class T", "(1) : error : Met EOS before read matching angled bracket"},
+      {"$struct A<int = 3> { };", "(1) : error : Expected identifier before > when read 3"},
+      {"$struct A<int = 3,\nT> { };", "(1) : error : Expected identifier before comma when read 3"},
+      {"$struct A 1", "(1) : error : Expected { after A when read 1"},
+      {"$struct A { } x", "(1) : error : ; expected after definition of $struct A when read x"},
+      {"$struct A <<os>>; $struct A <<os>>;", "(1) : error : $struct A already deferred"},
+      // qualifiers
+      {"$struct A <<\nos bogus>> { };", "(2) : error : Unrecognised qualifier << bogus >> on $struct A"},
+      {"$model A <<-dc>> { };", "(1) : error : Qualifier <<-dc>> invalid for a $model"},
+      {"$struct A { $struct B <<reflect>> { }; };", "(1) : error : Qualifier <<reflect>> invalid for a nested type"},
+      {"$struct A { $struct B <<register>> { }; };", "(1) : error : Qualifier <<register>> invalid for a nested type"},
+      {"$struct A <<nested reflect>> { };", "(1) : error : Qualifier <<reflect>> invalid for a nested type"},
+      {"$struct A <<abstract>> isa vesk::IPersistable { };",
+       "(1) : error : IPersistable classes must have a default constructor"},
+      {"$struct A <<-dc>> isa vesk::IPersistable { };",
+       "(1) : error : IPersistable classes must have a default constructor"},
+      {"$struct A <<genop>> { };", "(1) : error : Class $struct A needs to generate ops but doesn't implement IObject"},
+      // isa, bases, head
+      {"$mixin M isa vesk::IObject { };", "(1) : error : 'isa' prohibited on a $mixin"},
+      {"$enum E { e }; $struct A isa vesk::IObject,\nE { };",
+       "(2) : error : $interface identifier expected when read $enum E"},
+      {"$struct A isa { };", "(1) : error : Expected identifier after isa when read {"},
+      {"$class A mixin [ ] { };", "(1) : error : Expected : after A when read mixin"},
+      {"$class A model { } { };", "(1) : error : Expected : after A when read model"},
+      {"$class A : { };", "(1) : error : Unexpected { after :"},
+      {"$class A : public\n1 { };", "(2) : error : Expected base class identifier after public when read 1"},
+      {"$class A : B:: { };", "(1) : error : Expected identifier after :: when read {"},
+      {"$class A : B;", "(1) : error : Expected ',' ':' '{' 'model' or 'mixin' after B when read ;"},
+      {"$class A : B<x { };", "(1) : error : Met EOS before read matching angled bracket"},
+      {"$class A : B(x { };", "(1) : error : Met EOS before read matching round bracket"},
+      {"$class A : mixin { };", "(1) : error : Expected [ after mixin when read {"},
+      {"$class A : B : x { };", "(1) : error : Expected [ after : when read x"},
+      {"$enum E { e }; $class A : model E { };", "(1) : error : Not a model : {"},
+      {"$struct S { }; $class A : model S { };", "(1) : error : Not a model : {"},
+      // the body
+      {"$struct A {\n{ }", "(2) : error : Met EOS before read matching brace"},
+      {"$struct A { $$}; ", "(1) : error : Met EOS before read matching brace"},
+      {"$struct A { $int32 x; $int32 x; };", "(1) : error : Redefinition of field x"},
+      {"$struct A { $int32 x, y; };", "(1) : error : ; expected after field declaration when read ,"},
+      {"$struct A { $void f() { ; };", "(1) : error : Met EOS before read matching brace"},
+      {"$struct A { $void f([E] e); };", "(1) : error : '[' unexpected.  Polymorphic argument not allowed here"},
+      {"$struct+ A { $int x; };", "(1) : error : Can't accept platform dependent type: int"},
+      {"$struct A { $model { int32 x; } $model { } };", "(1) : error : Repeated model declaration"},
+      {"$struct A { $model { int32 x; } $int32 x; };", "(1) : error : Redefinition of field x"},
+  });
+}
+
+}  // namespace
+}  // namespace qrex

@@ -1,0 +1,195 @@
+// Look-up over the file and its imports, conflicts, and the numbered warnings.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class NameSpaceTest : public TranslateTest {
+ protected:
+  // Translates a new .cpp with the import of IObject.h on its first line: "" or what it fails with.
+  std::string Fault(const std::string& text) {
+    std::string name = "t.cpp";
+    for (int i = 2; host->FindFile(PathOf(name)); ++i) name = "t" + std::to_string(i) + ".cpp";
+    std::string error = ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
+    ReplaceAllInPlace(error, name, "t.cpp");
+    return error.compare(0, 8, "no error") == 0 ? "" : error;
+  }
+  void AddHeader(const std::string& name, const std::string& text) {
+    AddFile(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
+  }
+};
+
+using LookUp = NameSpaceTest;
+
+TEST_F(LookUp, CurrentNameSpaceThenRoot) {
+  const std::string names = "$struct R { }; namespace a { $struct A { }; namespace b { $struct B { }; } }\n";
+  for (const std::string use : {"$type R;", "namespace a { namespace b { $type R; $type B; $type a::A; } }",
+                                "namespace a { $type A; $type b::B; $type ::R; $type a::b::B; }"}) {
+    EXPECT_EQ("", Fault(names + use)) << use;
+    MakeWorld(TargetType::Application);
+  }
+  AssertErrors({
+      {names + "namespace a { namespace b { $type A; } }", "(2) : error : Unrecognised identifier : A"},
+      {names + "$type A;", "(2) : error : Unrecognised identifier : A"},
+      {names + "namespace a { $type ::A; }", "(2) : error : Unrecognised identifier : A"},
+      {names + "$type a::R;", "(2) : error : Unrecognised identifier : R"},
+      {names + "$type R::x;", "(2) : error : :: not expected here : $struct R is not a namespace"},
+      {names + "$type a::\n1;", "(3) : error : Expected identifier after :: when read 1"},
+      {names + "$struct K isa R { };", "(2) : error : $interface identifier expected when read $struct R"},
+      {names + "$struct K isa a::A::x { };", "(2) : error : :: not expected here : $struct a::A is not a namespace"},
+      {names + "$struct K isa a::none { };", "(2) : error : Unrecognised identifier : none"},
+      {names + "$struct K isa ::a::\n{ };", "(3) : error : Expected identifier after :: when read {"},
+  });
+}
+
+TEST_F(LookUp, ImportsAreSeenThroughImports) {
+  AddHeader("a.h", "namespace n { namespace m { $struct A { }; } }");
+  AddFile("b.h", "@import \"a.h\"\nnamespace n { $struct B { }; }");
+  EXPECT_EQ("",
+            Fault("@import \"b.h\"\n$type n::m::A; namespace n { $type m::A; $type B; $struct C { }; }\n$type n::C;"));
+}
+
+TEST_F(LookUp, NothingIsSeenWithoutImport) {
+  AddHeader("a.h", "$struct A { }; namespace n { }");
+  Translate("a.h");
+  EXPECT_EQ("t.cpp(1) : error : Unrecognised identifier : A", Fault("$type A; @import \"a.h\""));
+}
+
+TEST_F(LookUp, ForwardDeclarationsNeverConflict) {
+  AddHeader("a.h", "$struct X;");
+  AddHeader("b.h", "$struct X; $struct+ Y;");
+  AddHeader("c.h", "$struct+ X { };");
+  const std::string imports = "@import \"a.h\"\n@import \"c.h\"\n@import \"b.h\"\n";
+  EXPECT_EQ("", Fault(imports + "$type+ X; $type Y; $struct X;\n"));
+  EXPECT_EQ("t.cpp(4) : error : Repeated definition of $struct X", Fault(imports + "$struct X { };"));
+  EXPECT_EQ(
+      "b.h(1) : warning W1017 : + on forward declaration of Y deprecated\nc.h(1) : see declaration of $struct+ X\n",
+      Messages());
+}
+
+// The newest declaration of a name is the one that may still become a definition.
+TEST_F(LookUp, OwnDeclarationsMoveOn) {
+  EXPECT_EQ("", Fault("$struct X; $struct Y { $X* x; }; $struct X; $struct X { }; $type X;"));
+  MakeWorld(TargetType::Application);
+  AddHeader("a.h", "$class X;");
+  AddHeader("b.h", "@import \"a.h\"\n$class X; $class+ X;");
+  EXPECT_EQ("", Fault("@import \"b.h\"\n$class X { }; $type X;"));
+}
+
+TEST_F(LookUp, Ambiguity) {
+  AddHeader("a.h", "$struct X { };");
+  AddHeader("b.h", "$struct X { };");
+  AddHeader("c.h", "$enum X { x };");
+  AddHeader("d.h", "$struct Y; $enum Z;");
+  AddHeader("e.h", "$enum Y; $enum Z;");
+  EXPECT_EQ("", Fault("@import \"a.h\"\n@import \"b.h\"\n@import \"c.h\"\n"));
+  EXPECT_EQ("error : Ambiguous identifier : X", Fault("@import \"a.h\"\n@import \"b.h\"\n$type X;"));
+  EXPECT_EQ("error : Ambiguous identifier : X", Fault("@import \"a.h\"\n@import \"c.h\"\n$type X;"));
+  EXPECT_EQ("error : Ambiguous identifier : Y", Fault("@import \"d.h\"\n@import \"e.h\"\n$type Z; $type Y;"));
+  EXPECT_EQ("", Fault("@import \"c.h\"\n$type X;"));
+}
+
+TEST_F(NameSpaceTest, Conflicts) {
+  EXPECT_EQ("t.cpp(3) : error : $class A conflicts with previous declaration of $struct A",
+            Fault("\n$struct A;\n$class A;"));
+  EXPECT_EQ("t.cpp(2) : see declaration of $struct A\n", Messages());
+  MakeWorld(TargetType::Application);
+  EXPECT_EQ("t.cpp(1) : error : $struct E conflicts with previous declaration of $enum+ n::E",
+            Fault("namespace n { $enum+ E { x }; $struct E { }; }"));
+  MakeWorld(TargetType::Application);
+  EXPECT_EQ("t.cpp(2) : error : Repeated definition of $struct B", Fault("$struct B { };\n$struct B { };"));
+  EXPECT_EQ("t.cpp(1) : see declaration of $struct B\n", Messages());
+}
+
+// --- Qualifiers and `+`
+
+TEST_F(NameSpaceTest, Modifiers) {
+  AssertErrors({
+      {"$struct++ A;", "(1) : error : '+' modifier repeated"},
+      {"$type + + int32;", "(1) : error : '+' modifier repeated"},
+      {"$type <<\nreflekt>> int32;", "(2) : error : Unrecognised qualifier << reflekt >> on $type"},
+      {"$function <<-extern>> void f() { }", "(1) : error : Unrecognised qualifier << extern >> on $function "},
+  });
+}
+
+// --- Warnings
+
+TEST_F(NameSpaceTest, Warnings) {
+  AssertMessages({
+      {"\n$struct A : [ 1 ] { };", "t.h(2) : warning W1001 : Non-reflected $struct A contains metadata\n"},
+      {"$struct A { $int32 x : [ 1 ]; };", "t.h(1) : warning W1001 : Non-reflected $struct A contains metadata\n"},
+      {"$struct A { $void f(int32 : [1] a) { } };",
+       "t.h(1) : warning W1001 : Non-reflected $struct A contains metadata\n"},
+      {"$struct A { };\n$struct+ B { $A a; $A* b; $xmap<int32,A> c; };",
+       "t.h(2) : warning W1002 : Reflected $struct+ B references non-registered $struct A\n"
+       "t.h(1) : see declaration of $struct A\n"},
+      {"$struct A; $struct+ R { }; $struct+ B { $A* a; $R r; }; $struct C <<reflect -reflect>> { $A* a; };", ""},
+      {"$interface I\n{ };\n$struct A isa I { };",
+       "t.h(3) : warning W1003 : isa on $interface I doesn't inherit from IObject\n"
+       "t.h(1) : see declaration of $interface I\n"
+       "t.h(3) : warning W1013 : isa on $interface I not reflected\n"
+       "t.h(1) : see declaration of $interface I\n"},
+      {"$interface+ I; $struct A isa\n I { };", "t.h(2) : warning W1016 : $interface+ I not defined\n"},
+      {"$struct A <<-copy>> { };\n$struct+ B <<copy>> { }; $struct C <<os -abstract>> { };",
+       "t.h(1) : warning W1004 : $struct A is not reflected and has redundant << >> directives\n"},
+      {"$struct A\n{ $mvector<vesk::IObject> a; };",
+       "t.h(2) : warning W1005 : mvector<T> is deprecated - instead use xvector<movable<pref<T> > >\n"},
+      {"$class+ A;", "t.h(1) : warning W1017 : + on forward declaration of A deprecated\n"},
+  });
+  EXPECT_EQ(1, host->warnings);
+}
+
+TEST_F(NameSpaceTest, WarningsOfLibraries) {
+  for (TargetType target : {TargetType::StaticLibrary, TargetType::DynamicLinkLibrary}) {
+    MakeWorld(target);
+    AssertMessages({
+        {"$class+ A { };", "t.h(1) : warning W1008 : $class+ A doesn't appear in public header of library\n"},
+        {"$class A { }; $mixin M { };", ""},
+    });
+    AssertMessages(
+        {{"\n$class A { };", "app/pub/t.h(2) : warning W1009 : $class A not exported in public header of library\n"},
+         {"$class+ A { }; $mixin M { };", ""}},
+        "pub/t.h");
+  }
+  MakeWorld(TargetType::Application);
+  AssertMessages({{"$class A { }; $class+ B { };", ""}}, "pub/t.h");
+}
+
+TEST_F(NameSpaceTest, WarningSwitches) {
+  const std::string fault = "$struct A <<copy>> { }; ";  // W1004
+  const std::string warning =
+      "t.h(1) : warning W1004 : $struct A is not reflected and has redundant << >> directives\n";
+  AssertMessages({
+      {"$warning() " + fault, warning},
+      {"$warning(disable:1004) " + fault, ""},
+      {"$warning(disable:1000 1002+2) " + fault, ""},
+      {"$warning(disable:1003 1005) " + fault, warning},
+      {"$warning(disable:1004; enable : 1004) " + fault, warning},
+      {"$warning(disable:1004; push; enable:1004) " + fault + "$warning(pop) $struct B <<dc>> { };", warning},
+      {fault + "\n$warning(push)\n", warning + "t.h(2) : warning W1015 : $warning(push) without matching pop\n"},
+  });
+  EXPECT_EQ("int a;\n\nint b;", Translate("t.cpp", "int a;\n$warning(push; disable: 1000; pop)\nint b;"));
+}
+
+// The flags belong to the file.
+TEST_F(NameSpaceTest, WarningsPerFile) {
+  AddHeader("a.h", "$warning(disable:1004) $struct A <<copy>> { };");
+  EXPECT_EQ("", Fault("@import \"a.h\"\n$struct B <<copy>> { };"));
+  EXPECT_EQ("t.cpp(2) : warning W1004 : $struct B is not reflected and has redundant << >> directives\n", Messages());
+}
+
+TEST_F(NameSpaceTest, ErrorsOfWarningDirectives) {
+  AssertErrors({
+      {"$warning push;", "(1) : error : Expected ( after warning when read push"},
+      {"$warning(\nsuppress: 1000)", "(2) : error : Expected push/pop/enable/disable after ( when read suppress"},
+      {"$warning(push pop)", "(1) : error : Expected ; or ) after push when read pop"},
+      {"$warning(pop)", "(1) : error : $warning pop without matching push"},
+      {"$warning(disable 1000)", "(1) : error : Expected : after disable when read 1000"},
+      {"$warning(disable: 999)", "(1) : error : Invalid warning code : 999"},
+      {"$warning(enable: 1002 1018)", "(1) : error : Invalid warning code : 1018"},
+  });
+}
+
+}  // namespace
+}  // namespace qrex

@@ -1,0 +1,209 @@
+// Where reflection records go, how they are registered, and what a project's main file holds.
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class RecordsTest : public TranslateTest {
+ protected:
+  void Reflect(const std::string& header, const std::string& name) {
+    AddFile(header, "@import \"Vesk/vxObject/IObject.h\"\n$enum+ " + name + " { x };\n");
+  }
+  // The things that the tail of a generated text registers.
+  static std::string Registered(const std::string& text) {
+    std::string names;
+    const std::string mark = "// Registration of ";
+    for (size_t at = 0; (at = text.find(mark, at)) != std::string::npos;) {
+      at += mark.size();
+      names += (names.empty() ? "" : ", ") + text.substr(at, text.find('\n', at) - at);
+    }
+    return names;
+  }
+};
+
+TEST_F(RecordsTest, NothingToRegister) {
+  EXPECT_EQ("", TranslateHeader("$struct A { $int32 x; }; $type int8; $type+<<-register>> int16;").tail);
+}
+
+TEST_F(RecordsTest, CommonShape) {
+  AddProject("deep", "tools/deep", TargetType::Application);
+  Project& deep = *workspace->projects.back();
+  AddFileTo(deep, "tools/deep/src/d.cpp",
+            "namespace a {\nnamespace b { $enum+ E { x }; $enum+ F <<-register>> { y }; }\n}\n");
+  ScannedFile& file = host->GetScannedFile(*host->FindFile("tools/deep/src/d.cpp"));
+  file.needsWriting = true;
+  deep.CollectFiles();
+  file.WriteGeneratedFile();
+  EXPECT_EQ((std::vector<std::string>{"a::b::E"}), host->RegisterMap().entries["tools/deep/src/d.cpp"]);
+}
+
+TEST_F(RecordsTest, TypeRegistrations) {
+  MakeWorld(TargetType::DynamicLinkLibrary);
+  settings.systemName = "Linux";
+  const Generated generated = TranslateHeader(
+      "$struct S { };\nnamespace a { namespace b {\n$type+ const S*;\n$type<<register>> xvector<int32>; } }\n"
+      "$type <<reflect>> bool ; int x;\n");
+  EXPECT_EQ(
+      "namespace a { namespace b {\n"
+      "app_API vesk::ReflectionByteCode _GetReflected(S const* const*);\n"
+      "app_API vesk::TypeOps const& _GetTypeOps(S const* const*);\n"
+      "\n"
+      "app_API vesk::ReflectionByteCode _GetReflected(vesk::xvector<vesk::int32> const*);\n"
+      "app_API vesk::TypeOps const& _GetTypeOps(vesk::xvector<vesk::int32> const*);\n"
+      " } }\n"
+      "vesk::ReflectionByteCode _GetReflected(bool const*);\n"
+      "vesk::TypeOps const& _GetTypeOps(bool const*);\n"
+      " int x;\n",
+      generated.header.substr(generated.header.find("namespace a { namespace b {")));
+
+  const std::string head =
+      "namespace a\n{\nnamespace b\n{\n"
+      "vesk::ReflectionByteCode _GetReflected(S const* const*)\n"
+      "{\n"
+      "    static const vesk::octet_t bc[] =\n    {\n        0x35,0x31,0x20,0x00,0x00\n    };\n"
+      "    static vesk::ConstStringZ _stringTable[] =\n    {\n        \"S\",\n    };\n"
+      "    return vesk::ReflectionByteCode(bc,_stringTable);\n"
+      "}\n"
+      "vesk::TypeOps const& _GetTypeOps(S const* const*)\n"
+      "{\n"
+      "    static vesk::TypeOps typeOps =\n"
+      "    {\n"
+      "        sizeof(S const*),\n"
+      "        (vesk::CompareVariableFn) (bool (*)(S const* const*, S const* const*)) vesk::VariableEqual<S const*>,\n";
+  EXPECT_EQ(head, generated.tail.substr(0, head.size()));
+  const std::string foot =
+      "    };\n    return typeOps;\n}\n"
+      "void _Register_xvector_int32()\n"
+      "{\n"
+      "    vxVerify(vesk::RegisterTypeOps(vesk::ReflectionByteCodeValue(_GetReflected((vesk::xvector<vesk::int32>*)0)),"
+      "&_GetTypeOps((vesk::xvector<vesk::int32>*)0)));\n"
+      "}\n"
+      "} // b\n} // a\n";
+  ASSERT_GE(generated.tail.size(), foot.size());
+  EXPECT_EQ(foot, generated.tail.substr(generated.tail.size() - foot.size()));
+  EXPECT_EQ((std::vector<std::string>{"a::b::ptr_S", "a::b::xvector_int32"}),
+            host->RegisterMap().entries["app/src/t.cpp"]);
+}
+
+TEST_F(RecordsTest, TypeErrors) {
+  EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$type int32;"));
+  AssertErrors({
+      {"$type\n1;", "(2) : error : Type expected when read 1"},
+      {"$type std::string;", "(1) : error : Unrecognised identifier : std"},
+      {"$type+ xvector<int8>\n x", "(2) : error : ; expected after $type vesk::xvector<vesk::int8> when read x"},
+  });
+}
+
+// Tails of headers go into the .cpp of the same stem, or else into the first that imports them directly.
+TEST_F(RecordsTest, PlacesOfTails) {
+  Reflect("own.h", "Own");
+  Reflect("free.h", "Free");
+  Reflect("deep.h", "Deep");
+  AddFile("mid.h", "@import \"deep.h\"\n$enum+ Mid { x };");
+  AddFile("own.cpp", "@import \"own.h\"\n@import \"free.h\"\n$enum+ Mine { x };");
+  AddFile("other.cpp", "@import \"mid.h\"\n@import \"own.h\"\n@import \"free.h\"\n");
+  EXPECT_EQ("$enum+ Own, $enum+ Free, $enum+ Mine", Registered(Translate("own.cpp")));
+  EXPECT_EQ("$enum+ Mid", Registered(Translate("other.cpp")));
+  EXPECT_EQ("", Messages());
+  EXPECT_EQ((std::vector<std::string>{"Own", "Free", "Mine"}), host->RegisterMap().entries["app/src/own.cpp"]);
+}
+
+TEST_F(RecordsTest, HeaderOfSameNameNotImported) {
+  Reflect("a.h", "A");
+  AddFile("b.h", "@import \"a.h\"\n");
+  AddFile("a.cpp", "@import \"b.h\"\n");
+  EXPECT_EQ("#include \"b.h\"\n", Translate("a.cpp"));
+  EXPECT_EQ("a.cpp(1) : warning : cpp file doesn't directly import header with same name\n", Messages());
+}
+
+TEST_F(RecordsTest, ForeignHeadersAreNotRegistered) {
+  Project& lib = AddProject("lib", "lib", TargetType::StaticLibrary);
+  AddFileTo(lib, "lib/x.h", "$enum+ X { x };");
+  EXPECT_EQ("", Registered(Translate("t.cpp", "@import \"lib/x.h\"\n")));
+  EXPECT_TRUE(host->RegisterMap().entries.empty());
+}
+
+TEST_F(RecordsTest, RegistriesFollowTheFiles) {
+  DeclarationRegistry registry(true);
+  registry.Update("a.cpp", {});
+  EXPECT_FALSE(registry.dirty);
+  registry.Update("a.cpp", {"X"});
+  EXPECT_TRUE(registry.dirty);
+  registry.dirty = false;
+  registry.Update("a.cpp", {"X"});
+  EXPECT_FALSE(registry.dirty);
+  registry.Update("a.cpp", {});
+  EXPECT_TRUE(registry.dirty && registry.entries.empty());
+}
+
+TEST_F(RecordsTest, MainFile) {
+  EXPECT_EQ(
+      "int main();\n"
+      "\n\n\nvoid Register_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
+      "    s_called = true;\n}\n"
+      "\n\n\nvoid Unregister_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
+      "    s_called = true;\n}\n",
+      Translate("app.cpp", "int main();\n"));
+}
+
+TEST_F(RecordsTest, MainFileOfWindowsLibrary) {
+  settings.systemName = "Windows";
+  MakeWorld(TargetType::DynamicLinkLibrary);
+  AddProject("stat", "libs/stat", TargetType::StaticLibrary);
+  AddProject("dyn", "libs/dyn", TargetType::DynamicLinkLibrary);
+  AddProject("tool", "tool", TargetType::ConsoleApplication);
+  AddProject("plain", "plain", TargetType::StaticLibrary).usesQrex = false;
+  app().subprojects = {"libs/dyn/src/dyn.qrpj", "tool/src/tool.qrpj", "plain/src/plain.qrpj", "none/src/none.qrpj",
+                       "libs/stat/src/stat.qrpj"};
+  host->RegisterMap().Update("app/src/b.cpp", {"n::m::B", "C"});
+  host->RegisterMap().Update("app/src/a.cpp", {"A"});
+  host->UnregisterMap().Update("app/src/a.cpp", {"n::a0"});
+  const std::string registerText =
+      "\nextern \"C\" __declspec(dllimport) void Register_Project_dyn();\nvoid Register_Project_stat();\n"
+      "\nvoid _Register_A(); \nnamespace n { namespace m { void _Register_B(); }}\nvoid _Register_C(); \n"
+      "\nextern \"C\" _declspec(dllexport) void Register_Project_app()\n"
+      "{\n    static bool s_called = false;\n    if (s_called) return;\n    s_called = true;\n"
+      "    Register_Project_dyn();\n    Register_Project_stat();\n"
+      "    _Register_A();\n    n::m::_Register_B();\n    _Register_C();\n}\n";
+  const std::string unregisterText =
+      "\nextern \"C\" __declspec(dllimport) void Unregister_Project_dyn();\nvoid Unregister_Project_stat();\n"
+      "\nnamespace n { void _Unregister_a0(); }\n"
+      "\nextern \"C\" _declspec(dllexport) void Unregister_Project_app()\n"
+      "{\n    static bool s_called = false;\n    if (s_called) return;\n    s_called = true;\n"
+      "    Unregister_Project_dyn();\n    Unregister_Project_stat();\n    n::_Unregister_a0();\n}\n";
+  AddFile("app.cpp", "");
+  EXPECT_EQ(registerText + unregisterText, Translate("app.cpp"));
+  settings.systemName = "Linux";
+  std::string plain = registerText + unregisterText;
+  ReplaceAllInPlace(plain, "__declspec(dllimport) ", "");
+  ReplaceAllInPlace(plain, "_declspec(dllexport) ", "");
+  EXPECT_EQ(plain, Translate("app.cpp"));
+}
+
+// A file whose text is no other than before, token by token, stays as it is.
+TEST_F(RecordsTest, TokenEquivalentOutputStays) {
+  settings.writeTokenEquivalent = false;
+  settings.diagnostics = true;
+  AddFile("t.c", "int a; // one\n");
+  ScannedFile& file = Scanned("t.c");
+  auto write = [&](const std::string& text) {
+    trace.clear();
+    file.translated = false;
+    file.needsWriting = true;
+    ReplaceFile(file.SourcePath(), text);
+    file.WriteGeneratedFile();
+    EXPECT_FALSE(file.needsWriting);
+    std::string written;
+    ReadWholeFile(written, host->TranslatedPath(file));
+    return written;
+  };
+  EXPECT_EQ("int a; // one\r\n", write("int a; // one\n"));
+  EXPECT_EQ("Writing: translated/t.c\n", Messages());
+  EXPECT_EQ("int a; // one\r\n", write("int /* two */ a;\n\n"));
+  EXPECT_EQ("Token equivalent: translated/t.c\n", Messages());
+  EXPECT_EQ("int b;", write("int b;"));
+}
+
+}  // namespace
+}  // namespace qrex

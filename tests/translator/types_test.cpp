@@ -1,0 +1,411 @@
+// Types: their codes, their spellings, what they can do, and all that may be wrong with them.
+
+#include "translator/emit.h"
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class TypesTest : public TranslateTest {
+ protected:
+  // Names that the types of all tests may use.
+  TypesTest() {
+    Translate(
+        "t.cpp",
+        "@import \"Vesk/vxObject/IObject.h\"\n$struct K { }; $enum E { a }; $functor void F(); $variant V { int32; };\n"
+        "namespace n { $struct+ S { }; $interface+ I { }; $typedef xvector<int32> T; $model M { int32 x; }; }\n"
+        "$typedef const K CK; $model O { pref<n::I> x; };");
+  }
+
+  // Parses with `read` at the begin of `text`; the printed form of the error that this raises, or "".
+  template <typename Read>
+  std::string Parse(const std::string& text, Read read) {
+    m_texts.push_back(std::make_unique<std::string>(text));
+    const TextRange range{std::string_view(*m_texts.back())};
+    const SourceMap map{{range.begin, range.end, 0}};
+    MemoryTextWriter sink;
+    struct Target : IOutputStream {
+      void Write(const void*, size_t) override {}
+      void Flush() override {}
+    } target;
+    ScannedFile& file = Scanned("t.cpp");
+    QrexParserOutputStream stream(target, file.lineTable, range, map);
+    TextWriter out(stream);
+    QrexParser parser(file, stream, out, range);
+    try {
+      read(parser);
+      return "";
+    } catch (const IException& exception) {
+      return ExceptionText(exception);
+    }
+  }
+
+  TypeCode CodeOf(const std::string& text, bool reflected = true) {
+    TypeCode code;
+    std::string name;
+    EXPECT_EQ("", Parse(text, [&](QrexParser& parser) {
+                EXPECT_TRUE(parser.ParseTypeWithName(code, &name, false, nullptr, reflected)) << text;
+                EXPECT_TRUE(parser.Is(kEndOfText)) << text;
+              }));
+    return code;
+  }
+  static std::string Hex(const std::string& code) {
+    static constexpr char kDigits[] = "0123456789abcdef";
+    std::string text;
+    for (unsigned char byte : code) {
+      if (!text.empty()) text += ' ';
+      text += kDigits[byte >> 4];
+      text += kDigits[byte & 15];
+    }
+    return text;
+  }
+  NameSpace& Root() { return *Scanned("t.cpp").rootNameSpace; }
+
+ private:
+  std::vector<std::unique_ptr<std::string>> m_texts;
+};
+
+TEST_F(TypesTest, Codes) {
+  const std::pair<std::string, std::string> cases[] = {
+      {"int32", "04"},
+      {"xstring", "10"},
+      {"vesk::float64", "0d"},
+      {"const int8*", "35 31 02"},
+      {"int8 const* x", "35 31 02"},
+      {"int8* const", "31 35 02"},
+      {"typename K const& x", "36 31 20 01 4b"},
+      {"xvector<int32>", "44 04"},
+      {"vesk::xvector<vesk::int32>", "44 04"},
+      {"xmap<string8,xset<xvector<bool>>>", "51 10 47 44 01"},
+      {"xmap< xset<int8>, pref<n::I> > x", "51 47 02 42 21 04 6e 3a 3a 49"},
+      {"mvector<n::I>", "44 33 42 21 04 6e 3a 3a 49"},
+      {"assignable<ptr<n::I>>", "32 40 21 04 6e 3a 3a 49"},
+      {"offsettable<uint64>", "34 0a"},
+      {"xbag<xlist<xdeque<DynArray<cref<K>>>>>", "48 46 45 49 43 20 01 4b"},
+      {"openvariant<V>", "41 25 01 56"},
+      {"E", "23 01 45"},
+      {"F", "24 01 46"},
+      {"::n::T", "22 04 6e 3a 3a 54"},
+      {"vesk::IObject*", "35 21 0d 76 65 73 6b 3a 3a 49 4f 62 6a 65 63 74"},
+      {"int32 x[3][2*2]", "50 03 00 00 00 50 04 00 00 00 04"},
+      {"K x[][256]", "49 50 00 01 00 00 20 01 4b"},
+      {"int32 : [7] x", "e1 a2 07 00 00 00 04"},
+      {"int32 : [true] * : [false] x", "e1 a1 00 35 e1 a1 01 04"},
+      {"int32 x : [\"s\"] [2] : [f(-1, g), 0.5]",
+       "e1 a4 01 73 e2 c2 01 66 a2 ff ff ff ff c0 01 67 a3 00 00 00 00 00 00 e0 3f 50 02 00 00 00 04"},
+  };
+  for (const auto& [text, code] : cases) EXPECT_EQ(code, Hex(CodeOf(text))) << text;
+}
+
+TEST_F(TypesTest, UnreflectedTypesStayText) {
+  const std::pair<std::string, std::string> cases[] = {
+      {"int", "int"},
+      {"unsigned*", "unsigned*"},
+      {"std::vector< std::map<int,K>> const& x", "std::vector< std::map<int,K>> const&"},
+      {"n::Unknown", "n::Unknown"},
+      {"K<int>", "K<int>"},
+      {"K", "K"},
+      {"xvector<DWORD>", "vesk::xvector<DWORD>"},
+  };
+  for (const auto& [text, spelling] : cases) EXPECT_EQ(spelling, TypeText(CodeOf(text, false))) << text;
+  EXPECT_EQ("27 03 69 6e 74", Hex(CodeOf("int", false)));
+  EXPECT_EQ("20 01 4b", Hex(CodeOf("K", false)));
+}
+
+TEST_F(TypesTest, Faults) {
+  auto fault = [&](const std::string& text) {
+    TypeCode code;
+    std::string name;
+    return Parse(text, [&](QrexParser& parser) {
+      if (!parser.ParseTypeWithName(code, &name, true, nullptr, true)) parser.Fail("no type");
+    });
+  };
+  const std::pair<std::string, std::string> cases[] = {
+      {"1", "no type"},
+      {"int x", "Can't accept platform dependent type: int"},
+      {"const unsigned x", "Can't accept platform dependent type: unsigned"},
+      {"__int64 x", "Can't accept platform dependent type: __int64"},
+      {"xvector<BYTE> x", "Can't accept platform dependent type: BYTE"},
+      {"std::string x", "Unrecognised identifier : std"},
+      {"n::none x", "Unrecognised identifier : none"},
+      {"n::xvector<int32> x", "Unrecognised identifier : xvector"},
+      {"K::x y", ":: not expected here : $struct K is not a namespace"},
+      {"K<int32> x", "Error reading '<'. Templates cannot be reflected"},
+      {"n::1", "Expected identifier after :: when read 1"},
+      {"int32 1", "Expected identifier after int32 when read 1"},
+      {"xvector int32", "Expected < after xvector when read int32"},
+      {"xvector<1>", "Syntax error : 1"},
+      {"xmap<int32 int32>", "Expected , after int32 when read int32"},
+      {"xmap<int32,>", "Syntax error : >"},
+      {"xset<int32;", "Expected > after int32 when read ;"},
+      {"int32& x[2]", "Unexpected '[' : arrays on reference type are illegal"},
+      {"int32 x[0]", "Array size must be greater than zero"},
+      {"int32 x[1-2]", "Array size must be greater than zero"},
+      {"int32 x[2;", "Expected ] after 2 when read ;"},
+      {"int32 x : 1", "Expected [ after : when read 1"},
+  };
+  for (const auto& [text, message] : cases) EXPECT_EQ("error : " + message, fault(text)) << text;
+  EXPECT_EQ("error : Reached end of stream while scanning for matching >", Parse("std::vector<int", [](QrexParser& p) {
+              TypeCode code;
+              p.ParseTypeWithName(code, nullptr, false, nullptr, false);
+            }));
+}
+
+TEST_F(TypesTest, MetadataLimitsAndFaults) {
+  auto fault = [&](const std::string& text) {
+    return Parse(text, [&](QrexParser& parser) {
+      std::string metadata;
+      parser.ParseMetadataList(metadata);
+    });
+  };
+  auto values = [](int count) {
+    std::string text = "1";
+    for (int i = 1; i < count; ++i) text += ",1";
+    return text;
+  };
+  const std::pair<std::string, std::string> cases[] = {
+      {"[" + values(32) + "]", "Maximum list size exceeded"},
+      {"[f(" + values(32) + ")]", "Maximum functor arglist size exceeded"},
+      {"[1 2]", ", or ] expected in meta-data list when read 2"},
+      {"[a = 1]", ", or ] expected in meta-data list when read ="},
+      {"[f(1;", ", or ) expected in functor arglist when read ;"},
+      {"[4294967296]", "64-bit integer metadata not supported"},
+      {"[[1], [f(2147483648)]]", "64-bit integer metadata not supported"},
+  };
+  for (const auto& [text, message] : cases) EXPECT_EQ("error : " + message, fault(text)) << text;
+  EXPECT_EQ("", fault("[" + values(31) + "]"));
+  EXPECT_EQ("", fault("[f(" + values(31) + "), -2147483648, [[], g()]]"));
+}
+
+TEST_F(TypesTest, Signatures) {
+  FunctionSignature signature;
+  EXPECT_EQ("", Parse("inline K const& f([E e], int32 a[2] = g(1, 2), string8 s = \",)\") const : [1]",
+                      [&](QrexParser& parser) { parser.ParseFunctionSignature(signature, true, false, true, true); }));
+  MemoryTextWriter out;
+  WriteSignature(out, signature);
+  EXPECT_EQ("inline K const& f(E e,vesk::Array<vesk::int32,2> a=g(1, 2),vesk::string8 s=\",)\") const", out.TakeText());
+  EXPECT_TRUE(signature.arguments.front().polymorphic);
+  EXPECT_EQ("e1 a2 01 00 00 00", Hex(signature.metadata));
+
+  const std::pair<std::string, std::string> cases[] = {
+      {"1", "Type expected when read 1"},
+      {"int32 1", "Function name expected when read 1"},
+      {"int32 f;", "Expected ( after f when read ;"},
+      {"int32 f([E e])", "'[' unexpected.  Polymorphic argument not allowed here"},
+      {"int32 f(int32)", "Expected identifier after int32 when read )"},
+      {"int32 f(int32 a; )", ", or ) expected in argument list when read ;"},
+      {"int32 f() const", "const specifier on global function prohibited"},
+  };
+  for (const auto& [text, message] : cases) {
+    EXPECT_EQ("error : " + message, Parse(text, [](QrexParser& parser) {
+                FunctionSignature ignored;
+                parser.ParseFunctionSignature(ignored, false, false, false, true);
+              }));
+  }
+}
+
+TEST_F(TypesTest, DirectionsOfRemoteArguments) {
+  auto fault = [&](const std::string& text) {
+    return Parse(text, [](QrexParser& parser) {
+      FunctionArg arg;
+      parser.ParseFunctionArg(arg, true, true);
+    });
+  };
+  const std::pair<std::string, std::string> cases[] = {
+      {"int32 a", "[in] or [out] expected when read int32"},
+      {"[into] int32 a", "in,out,inout or copy expected when read into"},
+      {"[in int32 a", "Expected ] after in when read int32"},
+      {"[in] int32& a", "in parameter a passed by reference"},
+      {"[in] int32* a", "in parameter a : cannot marshall pointer type"},
+      {"[in] int32* const& a", "in parameter a : cannot marshall pointer type"},
+      {"[out] int32 a", "out parameter a must be passed by reference"},
+      {"[inout] int32* a", "out parameter a must be passed by reference"},
+      {"[out] int32 const& a", "out parameter a cannot be passed by const reference"},
+      {"[copy] int32 a", "copy parameter a must be passed by pointer"},
+      {"[copy] int32 const* a", "copy parameter a cannot be passed by pointer to const"},
+      {"[copy] int32** a", "'copy' parameter a : cannot marshall pointer type"},
+  };
+  for (const auto& [text, message] : cases) EXPECT_EQ("error : " + message, fault(text)) << text;
+  for (const std::string text : {"[in] int32 a", "[in] K const& a", "[in] K const a", "[out] K& a", "[inout] int32& a",
+                                 "[copy] K* a", "[in] int32 : [1] a"}) {
+    EXPECT_EQ("", fault(text)) << text;
+  }
+}
+
+TEST_F(TypesTest, Spellings) {
+  const std::array<std::string, 4> cases[] = {
+      {"int8", "vesk::int8", "int8", ""},
+      {"void", "void", "void", ""},
+      {"string16", "vesk::string16", "string16", "vesk::string16::~basic_xstring"},
+      {"const K* const&", "K const* const&", "ref_ptr_K", ""},
+      {"n::S", "n::S", "n_S", "n::S::~S"},
+      {"xvector<int32>", "vesk::xvector<vesk::int32>", "xvector_int32", "vesk::xvector<vesk::int32>::~xvector"},
+      {"xset<xvector<K>>", "vesk::xset<vesk::xvector<K> >", "xset_xvector_K", "vesk::xset<vesk::xvector<K>>::~xset"},
+      {"xvector<movable<pref<n::I>>>", "vesk::xvector<vesk::pref<n::I>>", "xvector_pref_n_I",
+       "vesk::xvector<vesk::pref<n::I>>::~xvector"},
+      {"xmap<string8,xset<int8>>", "vesk::xmap<vesk::string8,vesk::xset<vesk::int8> >", "map_string8_xset_int8",
+       "vesk::xmap<vesk::string8,vesk::xset<vesk::int8> >::~xmap"},
+      {"K x[3]", "vesk::Array<K,3>", "array3_K", "vesk::Array<K,3>::~Array"},
+      {"xvector<int8 : [1]> : [2]", "vesk::xvector<vesk::int8>", "xvector_int8", "vesk::xvector<vesk::int8>::~xvector"},
+  };
+  for (const auto& [text, spelling, mangled, destructor] : cases) {
+    const TypeCode code = CodeOf(text);
+    EXPECT_EQ(spelling, TypeText(code));
+    EXPECT_EQ(mangled, MangledType(code));
+    EXPECT_EQ(destructor, QualifiedDestructorText(code));
+  }
+  MemoryTextWriter out;
+  PrintDeclaration(out, CodeOf("K"), "x", DeclarationMode::Reference);
+  PrintDeclaration(out, CodeOf("K"), "", DeclarationMode::ConstReference);
+  EXPECT_EQ("K& xK const&", out.TakeText());
+  EXPECT_EQ("a::xstring::~basic_xstring", QualifiedDestructorText(CodeOf("a::xstring", false)));
+}
+
+TEST_F(TypesTest, Sizes) {
+  const std::pair<std::string, int64_t> cases[] = {{"bool", 1},
+                                                   {"char16", 2},
+                                                   {"float32", 4},
+                                                   {"uint64", 8},
+                                                   {"int128", 16},
+                                                   {"string8", 24},
+                                                   {"E", 4},
+                                                   {"F", 16},
+                                                   {"K*", 8},
+                                                   {"ptr<n::I>", 16},
+                                                   {"n::T", 24},
+                                                   {"xlist<K>", -1},
+                                                   {"K", -1},
+                                                   {"V", -1},
+                                                   {"int16 x[3][5]", 30},
+                                                   {"K x[2]", -1},
+                                                   {"CK", -1},
+                                                   {"const E", 4},
+                                                   {"n::I", -1},
+                                                   {"xmap<int8,K>", 24},
+                                                   {"movable<cref<K>>", 24},
+                                                   {"int32&", -1}};
+  for (const auto& [text, size] : cases) EXPECT_EQ(size, SizeInBytes(CodeOf(text), Root())) << text;
+}
+
+TEST_F(TypesTest, SameTypes) {
+  auto same = [&](const std::string& a, const std::string& b) {
+    return SameType(CodeOf(a), Root(), CodeOf(b), Root());
+  };
+  EXPECT_TRUE(same("n::T", "xvector<int32>"));
+  EXPECT_TRUE(same("K", "n::S")) << "names of classes are not compared";
+  EXPECT_TRUE(same("int8 a[2]", "int8 : [1] a[3]"));
+  EXPECT_TRUE(same("CK*", "const K*"));
+  EXPECT_FALSE(same("K", "E"));
+  EXPECT_FALSE(same("const K*", "K*"));
+  EXPECT_FALSE(same("xmap<int8,int8>", "xmap<int16,int8>"));
+}
+
+TEST_F(TypesTest, WhatTypesCanDo) {
+  // serialised, visited for objects, visited for prefs
+  const std::pair<std::string, std::string> cases[] = {{"int32", "s"},
+                                                       {"void", ""},
+                                                       {"E", "s"},
+                                                       {"F", ""},
+                                                       {"K*", "o"},
+                                                       {"n::I", ""},
+                                                       {"pref<n::I>", "sop"},
+                                                       {"ptr<n::I>", "o"},
+                                                       {"cref<K>", "sop"},
+                                                       {"K", ""},
+                                                       {"n::M", "s"},
+                                                       {"O", "sop"},
+                                                       {"xvector<O>", "sop"},
+                                                       {"O x[2]", "sop"},
+                                                       {"const int32", ""},
+                                                       {"xset<int8>", "sop"},
+                                                       {"xmap<int8,K>", "op"},
+                                                       {"xmap<K,int8>", "op"},
+                                                       {"n::T", "s"},
+                                                       {"openvariant<V>", "s"},
+                                                       {"O&", "op"},
+                                                       {"movable<pref<n::I>>", "sop"}};
+  for (const auto& [text, can] : cases) {
+    const TypeCode code = CodeOf(text);
+    EXPECT_EQ(can, std::string(IsSerialisable(code, Root()) ? "s" : "") + (NeedsVisitObjects(code, Root()) ? "o" : "") +
+                       (NeedsVisitPrefs(code, Root()) ? "p" : ""))
+        << text;
+  }
+  EXPECT_TRUE(HasMetadata(CodeOf("xmap<int8,const int8 : [1]>")));
+  EXPECT_FALSE(HasMetadata(CodeOf("xmap<int8,K*>")));
+  EXPECT_FALSE(HasMetadata(CodeOf("K")));
+}
+
+TEST_F(TypesTest, FieldTypes) {
+  auto fault = [&](const std::string& text, bool inModel, bool serialisable) {
+    TypeContext context;
+    context.isMutable = true;
+    context.inModel = inModel;
+    context.serialisable = serialisable;
+    std::string message;
+    return CheckType(CodeOf(text), Root(), context, message) ? "" : message;
+  };
+  struct Case {
+    std::string text, inModel, serialisable, plain;  // what is wrong in each context
+  };
+  const std::string constInModel = "const or volatile qualifiers not permitted within models";
+  const Case cases[] = {
+      {"int32", "", "", ""},
+      {"const int32", constInModel, constInModel, ""},
+      {"const K*", "", "Pointers don't support serialisation", ""},
+      {"xvector<CK>", constInModel, constInModel, ""},
+      {"assignable<int32>", "", "", "assignable<> only permitted within models"},
+      {"assignable<movable<int32>>", "assignable<> and movable<> are incompatible decorators",
+       "assignable<> and movable<> are incompatible decorators", "assignable<> only permitted within models"},
+      {"offsettable<assignable<int32>>", "assignable<> and offsetable<> are incompatible decorators",
+       "assignable<> and offsetable<> are incompatible decorators", "assignable<> only permitted within models"},
+      {"xvector<assignable<int32>>", "assignable<> not permitted here - data type is immutable",
+       "assignable<> not permitted here - data type is immutable", "assignable<> only permitted within models"},
+      {"movable<pref<n::I>>", "", "", "movable<> only permitted within models"},
+      {"movable<offsettable<int32>>", "movable<> and offsetable<> are incompatible decorators",
+       "movable<> and offsetable<> are incompatible decorators", "movable<> only permitted within models"},
+      {"xvector<movable<cref<K>>>", "", "", "movable<> only permitted within models"},
+      {"xvector<movable<int8>>", "movable<T> only permitted where T is a pref/cref",
+       "movable<T> only permitted where T is a pref/cref", "movable<> only permitted within models"},
+      {"xvector<xmap<int8,movable<pref<n::I>>>>", "movable<> not permitted here", "movable<> not permitted here",
+       "movable<> only permitted within models"},
+      {"offsettable<int8>", "", "", "offsetable<> only permitted within models"},
+      {"offsettable<bool>", "Only integral types are offsetable", "Only integral types are offsetable",
+       "offsetable<> only permitted within models"},
+      {"xvector<offsettable<int8>>", "offsetable<> not permitted here - data type is immutable",
+       "offsetable<> not permitted here - data type is immutable", "offsetable<> only permitted within models"},
+      {"pref<K>", "pref<T> requires that T be an interface", "pref<T> requires that T be an interface",
+       "pref<T> requires that T be an interface"},
+      {"ptr<E>", "ptr<T> requires that T be an interface", "ptr<T> doesn't support serialisation",
+       "ptr<T> requires that T be an interface"},
+      {"cref<n::I>", "cref<T> requires that T be a class/struct/model",
+       "cref<T> requires that T be a class/struct/model", "cref<T> requires that T be a class/struct/model"},
+      {"void", "void not permitted here", "void not permitted here", "void not permitted here"},
+      {"void*", "", "Pointers don't support serialisation", ""},
+      {"xvector<n::I>", "Interface specfifer must appear in pref<> or ptr<>",
+       "Interface specfifer must appear in pref<> or ptr<>", "Interface specfifer must appear in pref<> or ptr<>"},
+      {"F", "functor not permitted within models", "functor not permitted within models", ""},
+      {"K&", "References not permitted within models", "References not permitted within models", ""},
+      {"ptr<n::I>", "", "ptr<T> doesn't support serialisation", ""},
+      {"xdeque<int8>", "deque<T> currently not supported", "deque<T> currently not supported",
+       "deque<T> currently not supported"},
+      {"xlist<int8>", "list<T> currently not supported", "list<T> currently not supported",
+       "list<T> currently not supported"},
+      {"int8 x[2][]", "", "", ""},
+      {"xbag<int8>", "bag<T> currently not supported", "bag<T> currently not supported",
+       "bag<T> currently not supported"},
+      {"xmap<assignable<int8>,int8>", "assignable<> not permitted here - data type is immutable",
+       "assignable<> not permitted here - data type is immutable", "assignable<> only permitted within models"},
+      {"xmap<int8,assignable<int8>>", "", "", "assignable<> only permitted within models"},
+  };
+  for (const Case& c : cases) {
+    EXPECT_EQ(c.inModel, fault(c.text, true, false)) << c.text;
+    EXPECT_EQ(c.serialisable, fault(c.text, true, true)) << c.text;
+    EXPECT_EQ(c.plain, fault(c.text, false, false)) << c.text;
+  }
+  EXPECT_EQ("const or volatile qualifiers not permitted on serialisable types", fault("const int8", false, true));
+  EXPECT_EQ("functor doesn't support serialisation", fault("F", false, true));
+  EXPECT_EQ("References don't support serialisation", fault("K&", false, true));
+}
+
+}  // namespace
+}  // namespace qrex
