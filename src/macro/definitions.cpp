@@ -51,7 +51,7 @@ void ExpansionContext::Let() {
     value = ExpandPart(text, indent);
   } else {
     try {
-      value = EvaluateAsText(m_frame, text, type);
+      value = EvaluateAsText(m_frame, text, type, m_anchor);
     } catch (LexScannerException& exception) {
       if (assigned) exception.message += "\n    when parsing expression '" + text.Text() + "' for @let directive";
       throw;
@@ -136,7 +136,7 @@ void ExpansionContext::AddMacro(std::unique_ptr<LSMacroVariable> macro, bool fil
   if (!frame) throw LexScannerException(fileScope ? "No filescope frame" : "No parent frame", macro->name);
   if (m_anchor) {
     macro->isTemporary = true;
-    macro->OwnText(m_text);
+    macro->OwnText({macro->name.begin, m_scanner.begin});
   }
   frame->AddVariable(std::move(macro));
 }

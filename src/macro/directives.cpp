@@ -145,7 +145,7 @@ void ExpansionContext::Quote() {
   while (!m_scanner.AtEnd()) {
     const size_t lineFeed = m_scanner.View().find('\n');
     const char* end = lineFeed == std::string_view::npos ? m_scanner.end : m_scanner.begin + lineFeed + 1;
-    m_sink.WriteVerbatim({m_scanner.begin, end}, column);
+    CopySource({m_scanner.begin, end}, column);
     m_scanner.begin = end;
     StripIndentation(indent);
   }
@@ -265,7 +265,7 @@ void ExpansionContext::DefineSubstitution() {
   if (token.kind == kDoubleQuoted) {
     DecodeString(token, value);
   } else if (token.kind == kOpenParen) {
-    value = EvaluateString(ReadParenSection(m_scanner, true), "@$" + name);
+    value = EvaluateString(ReadParenSection(m_scanner, true), "@$");
   } else {
     FailAt(token, "Quoted string expected after $" + name + " definition when read " + Printed(token));
   }

@@ -159,15 +159,16 @@ bool ExpansionContext::ExpandPredefined(const LexToken& name) {
 // --- Output
 
 void ExpansionContext::FlushTo(const char* position) {
-  if (m_pendingBegin < position) {
-    const TextRange text(m_pendingBegin, position);
-    if (m_anchor) {
-      m_sink.WriteGenerated(text.View(), *m_anchor, m_outIndent);
-    } else {
-      m_sink.WriteVerbatim(text, m_outIndent);
-    }
-  }
+  if (m_pendingBegin < position) CopySource({m_pendingBegin, position}, m_outIndent);
   m_pendingBegin = position;
+}
+
+void ExpansionContext::CopySource(const TextRange& text, int64_t indent) {
+  if (m_anchor) {
+    m_sink.WriteGenerated(text.View(), *m_anchor, indent);
+  } else {
+    m_sink.WriteVerbatim(text, indent);
+  }
 }
 
 void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
@@ -245,6 +246,12 @@ std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRan
 
 std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
                                   int64_t outIndent, SourceMap& map) {
+  // A file counts afresh: a chain of imports may be longer than the nesting of macros.
+  struct Restore {
+    int value;
+    ~Restore() { nesting = value; }
+  } restore{nesting};
+  if (handler) nesting = 0;
   ExpansionSink sink;
   sink.output.reserve(text.Size());
   ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).Run();
@@ -275,8 +282,12 @@ std::string ReadCanonical(ExpressionParser& parser, VarType type) {
 }  // namespace
 
 std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type) {
+  return EvaluateAsText(frame, text, type, nullptr);
+}
+
+std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type, const TextRange* anchor) {
   LSFrame child(&frame);
-  const std::string expansion = ExpandAside(child, text, 0, nullptr);
+  const std::string expansion = ExpandAside(child, text, 0, anchor);
   try {
     ExpressionParser parser;
     parser.SetInput(TextRange(std::string_view(expansion)));

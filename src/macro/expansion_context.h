@@ -49,6 +49,7 @@ class ExpansionContext {
   // --- Expansion of parts of the text
   void ExpandBlock(const TextRange& block, LSFrame& frame, int indent, int64_t column);
   std::string ExpandPart(const TextRange& part, int64_t stripIndent = 0);  // in a child frame
+  void CopySource(const TextRange& text, int64_t indent);                  // to the sink, as it stands
   LexToken Next() { return NextToken(m_scanner); }
   LexToken RequireIdentifier(std::string_view message);  // fails with the message and the token
   [[noreturn]] void FailAt(const LexToken& token, std::string message) const;
@@ -131,6 +132,7 @@ class ExpansionContext {
 
 // Expansion into a string of its own; no map is kept.
 std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor);
+std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type, const TextRange* anchor);
 
 // A position in a text that is about to end must not survive it.
 void ForgetPosition(LexScannerException& exception, const std::string& text);

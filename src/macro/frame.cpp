@@ -44,6 +44,12 @@ void LSMacroVariable::OwnText(TextRange text) {
   ownedText = std::move(owned);
 }
 
+void LSMacroVariable::OwnBody() {
+  auto owned = std::make_shared<const std::string>(body.View());
+  body = TextRange(std::string_view(*owned));
+  ownedText = std::move(owned);
+}
+
 void LSValueVariable::WriteDefinition(TextWriter& writer) const { writer << name.View() << " = " << value; }
 void LSValueVariable::WriteValue(TextWriter& writer) const { writer << value; }
 
@@ -68,9 +74,9 @@ LSFrame::~LSFrame() = default;
 void LSFrame::AddVariable(std::unique_ptr<LSVariable> variable) {
   LSVariable& added = *variable;
   m_variables.push_back(std::move(variable));
-  m_names.erase(added.name.View());  // the key must refer to the text of the newest
+  const bool replaces = m_names.erase(added.name.View()) != 0;  // the key must refer to the text of the newest
   m_names.emplace(added.name.View(), &added);
-  OnAdded(added);
+  OnAdded(added, replaces);
 }
 
 LSVariable* LSFrame::FindLocal(std::string_view name) const {
@@ -126,14 +132,13 @@ class DefinitionTable {
   };
 
   void Enter(std::string_view name, size_t frame, LSVariable* variable) {
-    std::vector<Entry>& entries = m_entries[std::string(name)];
-    for (Entry& entry : entries) {
-      if (entry.frame == frame) {
-        entry.variable = variable;
-        return;
-      }
+    m_entries[std::string(name)].push_back({frame, variable});
+  }
+
+  void Replace(std::string_view name, size_t frame, LSVariable* variable) {
+    for (Entry& entry : m_entries.find(name)->second) {
+      if (entry.frame == frame) entry.variable = variable;
     }
-    entries.push_back({frame, variable});
   }
 
   void Remove(std::string_view name, size_t frame) {
@@ -165,6 +170,9 @@ size_t NextFrameIndex() {
   return next++;
 }
 
+// Every file has its own @filename and the like; they are never looked up through imports.
+bool IsPredefined(std::string_view name) { return name.substr(0, 1) == "@"; }
+
 constexpr int kMaxPasses = 100;
 constexpr size_t kMaxSubstituted = 64u << 20;
 
@@ -173,10 +181,20 @@ constexpr size_t kMaxSubstituted = 64u << 20;
 LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(NextFrameIndex()) { m_fileFrame = this; }
 
 LSFileFrame::~LSFileFrame() {
-  for (const auto& [name, variable] : m_names) Definitions().Remove(name, m_index);
+  for (const auto& [name, variable] : m_names) {
+    if (!IsPredefined(name)) Definitions().Remove(name, m_index);
+  }
 }
 
-void LSFileFrame::OnAdded(LSVariable& variable) { Definitions().Enter(variable.name.View(), m_index, &variable); }
+void LSFileFrame::OnAdded(LSVariable& variable, bool replaces) {
+  const std::string_view name = variable.name.View();
+  if (IsPredefined(name)) return;
+  if (replaces) {
+    Definitions().Replace(name, m_index, &variable);
+  } else {
+    Definitions().Enter(name, m_index, &variable);
+  }
+}
 
 void LSFileFrame::AddImport(LSFileFrame& imported) {
   m_allImports.Add(imported.m_index);
@@ -243,6 +261,9 @@ void LSFileFrame::DefineSubstitution(const std::string& name, const std::string&
 }
 
 const std::string* LSFileFrame::FindSubstitution(std::string_view name) const {
+  auto own = m_substitutions.find(name);
+  if (own != m_substitutions.end()) return &own->second;
+  if (m_orderedImports.empty() || !Definitions().Find("_" + std::string(name) + "_")) return nullptr;
   std::vector<const LSFileFrame*> pending{this};
   std::unordered_set<const LSFileFrame*> seen;
   while (!pending.empty()) {

@@ -49,6 +49,7 @@ class LSMacroVariable : public LSVariable {
   std::string Signature() const;
   // Makes name, formals and body refer to a copy of `text`, in which they lie now.
   void OwnText(TextRange text);  // by value: it may be one of them
+  void OwnBody();                // the same for the body alone
 
   bool isPython = false;
   bool isNaked = false;
@@ -103,7 +104,7 @@ class LSFrame {
   LSFileFrame* FileFrame() const { return m_fileFrame; }
 
  protected:
-  virtual void OnAdded(LSVariable&) {}
+  virtual void OnAdded(LSVariable&, bool) {}
 
   std::vector<std::unique_ptr<LSVariable>> m_variables;       // oldest first
   std::unordered_map<std::string_view, LSVariable*> m_names;  // the newest of each name
@@ -128,7 +129,7 @@ class LSFileFrame : public LSFrame {
   void CopyFrom(const LSFileFrame& other);   // the definitions and substitutions of another frame
 
  protected:
-  void OnAdded(LSVariable& variable) override;
+  void OnAdded(LSVariable& variable, bool replaces) override;
 
  private:
   class NearestDefinition;

@@ -44,7 +44,7 @@ void ExpansionContext::BindArgument(LSFrame& frame, const BoundArgument& argumen
   if (formal.type != VarType::Macro) {
     std::string value;
     try {
-      value = EvaluateAsText(m_frame, argument.text, formal.type);
+      value = EvaluateAsText(m_frame, argument.text, formal.type, m_anchor);
     } catch (LexScannerException& exception) {
       exception.message += "\n    passing formal argument " + formal.name.Text() + " to macro " + macro.name.Text();
       throw;
@@ -60,6 +60,8 @@ void ExpansionContext::BindArgument(LSFrame& frame, const BoundArgument& argumen
   variable->homeFrame = &m_frame;
   variable->isFunctionArgument = formal.isFunction;
   variable->isTemporary = m_anchor != nullptr;
+  // An argument of a naked macro stays in the frame, which may outlive the text.
+  if (m_anchor && macro.isNaked) variable->OwnBody();
   frame.AddVariable(std::move(variable));
 }
 
@@ -94,7 +96,8 @@ void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
       throw;
     }
   } else if (macro.resultType != VarType::Macro) {
-    EmitGenerated(EvaluateAsText(frame, macro.body, macro.resultType));
+    const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
+    EmitGenerated(EvaluateAsText(frame, macro.body, macro.resultType, anchor));
   } else if (!macro.body.Empty()) {
     const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
     ExpansionContext(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor).Run();

@@ -79,7 +79,7 @@ bool SetReadOnly(const std::string& path, bool readOnly) {
 
 int64_t LastWriteTime(const std::string& path) {
   platform::FileInfo info;
-  return platform::Stat(Checked(path), info) ? info.writeTime : 0;
+  return platform::Stat(Checked(path), info) && !info.isDirectory ? info.writeTime : 0;
 }
 
 bool TouchFile(const std::string& path, bool create) {

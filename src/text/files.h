@@ -19,7 +19,7 @@ bool CopyFile(const std::string& from, const std::string& to, bool failIfExists)
 bool CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 bool SetReadOnly(const std::string& path, bool readOnly);
-int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 when it can't be opened
+int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a directory and a missing file
 bool TouchFile(const std::string& path, bool create);
 bool FullPathOf(const std::string& path, std::string& out);
 bool ReadWholeFile(std::string& out, const std::string& path);

@@ -29,7 +29,7 @@ auto Convert(const std::string& text, const char* what, std::string& error, bool
   ok = false;
   if (*begin == 0 && begin == text.c_str() + text.size()) {
     error = "Empty string";
-  } else if (end == begin || end != text.c_str() + text.size()) {
+  } else if (*begin == '\v' || *begin == '\f' || end == begin || end != text.c_str() + text.size()) {
     error = what;
   } else {
     ok = true;
