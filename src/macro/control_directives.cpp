@@ -6,9 +6,9 @@
 
 namespace qrex {
 
-namespace {
+int64_t maxIterations = 1000000;
 
-constexpr int64_t kMaxIterations = 1000000;
+namespace {
 
 // On a copy of the scanner: `@` and the word, with comments and line ends between at will.
 bool Probe(LexScanner& scanner, std::string_view word) {
@@ -70,7 +70,7 @@ void ExpansionContext::While() {
   DropToScanner();
   const int64_t column = CurrentColumn();
   for (int64_t i = 0; EvaluateCondition(condition, "@while"); ++i) {
-    if (i == kMaxIterations) throw LexScannerException("Too many iterations in @while directive", m_tokenText);
+    if (i == maxIterations) throw LexScannerException("Too many iterations in @while directive", m_tokenText);
     LSFrame child(&m_frame);
     ExpandBlock(block, child, indent, column);
   }

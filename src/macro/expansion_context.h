@@ -130,6 +130,8 @@ class ExpansionContext {
   const char* m_settled;
 };
 
+extern int64_t maxIterations;  // of one @while
+
 // Expansion into a string of its own; no map is kept.
 std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor);
 std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type, const TextRange* anchor);

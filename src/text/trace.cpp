@@ -36,6 +36,7 @@ class TraceSink {
     std::lock_guard lock(m_lock);
     m_toStdout = false;
     m_file.reset();
+    m_pending.clear();
   }
 
   void Write(std::string_view text) {

@@ -1,0 +1,189 @@
+"""Makers of workloads: each writes a workspace (and what a peer reads) below a folder and tells what it made."""
+
+import os
+import random
+
+CONFIGURATION = """virtualTree = { "tree" }
+$EXPORT_LIB = "out/lib"
+$EXPORT_TRANSLATED_INCLUDE = "out/tinc"
+$EXPORT_UNTRANSLATED_INCLUDE = "out/uinc"
+workspaces = { "ws/all.qrws" }
+config = "Debug"
+platform = "x64"
+mode = build
+translateOnly = true
+compiler = gcc
+systemName = "Linux"
+"""
+
+PROJECT = """$TARGET_TYPE = "Application"
+$ROOT_TO_PROJDIR = "app"
+qrex
+config { "Debug|x64" "Release|x64" }
+{
+"src" { %s }
+}
+"""
+
+
+def write(path, text):
+    os.makedirs(os.path.dirname(path), exist_ok=True)
+    with open(path, "w", newline="\n") as file:
+        file.write(text)
+
+
+def workspace(root, files):
+    """A workspace with one project, `app`, whose sources are `files` (name: text). `Qrex main.qrex` in root builds it."""
+    write(f"{root}/main.qrex", CONFIGURATION)
+    write(f"{root}/tree/.qrwsroot", "")
+    write(f"{root}/tree/ws/all.qrws", '"all" { "app" }\n')
+    write(f"{root}/tree/app/src/app.qrpj", PROJECT % " ".join(f'"{name}"' for name in files))
+    for name, text in files.items():
+        write(f"{root}/tree/app/src/{name}", text)
+
+
+def translated(root, name):
+    """The generated text of a source of `app`, with plain line ends."""
+    with open(f"{root}/qrexsource/x64/Debug/app/src/{name}", newline="") as file:
+        return file.read().replace("\r\n", "\n")
+
+
+# --- Plain C++
+
+WORDS = """account buffer cache column cursor delta entry field frame handle header image input item key label limit line
+list margin message name node offset option order owner packet page parent path pixel point price queue range record
+region result row sample scope segment session shape signal size slot source state store stream style table target task
+text thread token total tree unit value vector version view weight width window""".split()
+TYPES = ["int", "double", "bool", "std::string", "const char*", "size_t", "uint32_t"]
+
+
+class Names:
+    """Names of the kinds that C++ programs hold; the same for each run."""
+
+    def __init__(self, seed):
+        self.random = random.Random(seed)
+
+    def word(self):
+        return self.random.choice(WORDS)
+
+    def name(self):
+        return f"{self.word()}{self.word().capitalize()}"
+
+    def unique(self, number):
+        return f"{self.name()}{number}"
+
+    def type(self):
+        return self.random.choice(TYPES)
+
+    def number(self):
+        return self.random.randrange(1000)
+
+
+def plain_function(names, number):
+    a, b, c, f = names.name(), names.name(), names.name(), names.unique(number)
+    return f"""// Adds the {names.word()} of each {names.word()} to the {names.word()}; {names.word()} first.
+static {names.type()} {f}(const {names.type()}& {a}, int {b}) {{
+  int {c} = {names.number()};  /* {names.word()} */
+  for (int i = 0; i < {b}; ++i) {{
+    if ({a}.{names.word()}[i] != {names.number()} && !{a}.{names.name()}()) continue;
+    {c} += {a}.{names.word()}[i] * {names.number()} - ({b} << {names.number() % 8});
+    report("{names.word()} of {names.word()}: %d\\n", {c}, '{names.word()[0]}', {names.number()}.5);
+  }}
+  return {names.name()}({c}, {a}->{names.word()}, 0x{names.number():x});
+}}
+
+"""
+
+
+def plain_text(size, seed=1):
+    names = Names(seed)
+    pieces, length = [], 0
+    while length < size:
+        piece = plain_function(names, len(pieces))
+        pieces.append(piece)
+        length += len(piece)
+    return "".join(pieces)
+
+
+def plain(root, size):
+    """Plain C++ without a macro: plain.cpp of the workspace."""
+    text = plain_text(size)
+    workspace(root, {"plain.cpp": text})
+    return {"size": len(text), "source": f"{root}/tree/app/src/plain.cpp"}
+
+
+# --- Macro calls
+
+MACROS = {  # name: formals, body with the formals in braces
+    "LIMIT": ([], "4096"),
+    "FIELD": (["type", "name"], "{type} get_{name}() const {{ return m_{name}; }}"),
+    "CHECK": (["x", "y"], "if (!({x} == {y})) {{ report({x}, {y}); }}"),
+    "GUARD": (["lock"], "Guard guard({lock}); enter({lock})"),
+    "CLAMP": (["v", "low", "high"], "({v} < {low} ? {low} : {v} > {high} ? {high} : {v})"),
+}
+
+
+def qrex_definitions():
+    lines = []
+    for name, (formals, body) in MACROS.items():
+        pasted = {formal: formal for formal in formals}
+        text = body.replace("_{name}", "_@@{name}").format(**pasted)
+        lines.append(f"@def {name}{'(' + ', '.join(formals) + ')' if formals else ''} = {text}\n")
+    return "".join(lines)
+
+
+def m4_definitions():
+    lines = []
+    for name, (formals, body) in MACROS.items():
+        numbers = {formal: f"${index + 1}" for index, formal in enumerate(formals)}
+        lines.append(f"define(`{name}', `{body.format(**numbers)}')dnl\n")
+    return "".join(lines)
+
+
+def calling_function(names, number):
+    """Five calls in some 290 bytes."""
+    a, b, f = names.name(), names.name(), names.unique(number)
+    return f"""// The {names.word()} of a {names.word()}.
+class {f} {{
+  FIELD({names.type()}, {a})
+  int {names.name()}(int {b}) {{
+    GUARD({names.word()}Lock);
+    CHECK({b}, {names.number()})
+    for (int i = LIMIT; i > {b}; --i) {names.word()}[i] += {b} * {names.number()};
+    return CLAMP({b} + {names.number()}, 0, {names.name()});
+  }}
+  {names.type()} m_{a};
+}};
+"""
+
+
+def macro_calls(root, size, calls):
+    """C++ with macro calls, padded with plain text: calls.cpp of the workspace, and calls.m4 for the peer."""
+    names = Names(2)
+    classes = [calling_function(names, number) for number in range(calls // 5)]
+    padding = plain_text(max(0, size - sum(map(len, classes))), 3).split("\n\n")
+    step = max(1, len(classes) // max(1, len(padding)))
+    pieces = []
+    for index, text in enumerate(classes):
+        pieces.append(text)
+        if index % step == 0 and index // step < len(padding):
+            pieces.append(padding[index // step] + "\n\n")
+    text = "".join(pieces)
+    workspace(root, {"calls.cpp": qrex_definitions() + text})
+    write(f"{root}/calls.m4", "changecom(`//')dnl\n" + m4_definitions() + text)
+    return {"size": len(text), "m4": f"{root}/calls.m4"}
+
+
+# --- Headers
+
+def import_chain(root, count):
+    """Each header imports the one before it and uses a macro of it; main.cpp imports the last."""
+    files = {}
+    for number in range(count):
+        imported = f'@import "h{number - 1}.h"\n' if number else ""
+        used = f"step{number - 1}(x)" if number else "x"
+        files[f"h{number}.h"] = (f"{imported}@def step{number}(x) = (x + {number})\n"
+                                 f"inline int f{number}(int x) {{ return {used}; }}\n")
+    files["main.cpp"] = f'@import "h{count - 1}.h"\nint main() {{ return f{count - 1}(0); }}\n'
+    workspace(root, files)
+    return {"size": sum(map(len, files.values()))}

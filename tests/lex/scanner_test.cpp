@@ -1,0 +1,242 @@
+// Tokens, literals and the readers of sections.
+
+#include "lex/scanner.h"
+
+#include <gtest/gtest.h>
+
+#include "lex/literals.h"
+#include "lex/sections.h"
+
+namespace qrex {
+
+// The message and the offset of a failure; else what `read` answers.
+template <typename Read>
+std::string Outcome(const std::string& text, Read read) {
+  LexScanner scanner{std::string_view(text)};
+  try {
+    return read(scanner);
+  } catch (const LexScannerException& exception) {
+    return exception.message + " at " + std::to_string(exception.position - text.data());
+  }
+}
+
+// Each token as kind (10000 left out) and text; a failure ends the list.
+std::string Tokens(const std::string& text, bool keepComments = false) {
+  std::string tokens;
+  const std::string end = Outcome(text, [&](LexScanner& scanner) {
+    for (;;) {
+      const LexToken token = NextToken(scanner, keepComments);
+      if (token.kind == kEndOfText) return std::string();
+      tokens += (tokens.empty() ? "" : "  ") + std::to_string(token.kind - 10000) + " " + token.text.Text();
+    }
+  });
+  return end.empty() ? tokens : tokens + "  !" + end;
+}
+
+TEST(ScannerTest, Operators) {
+  EXPECT_EQ("29 +  39 +=  37 ++  9 <  14 <=  19 <<  24 <<=", Tokens("+ += ++ < <= << <<="));
+  EXPECT_EQ("10 >  15 >=  20 >>  25 >>=  11 &  16 &=  21 &&  26 &&=", Tokens("> >= >> >>= & &= && &&="));
+  EXPECT_EQ("12 |  17 |=  22 ||  27 ||=  13 ^  18 ^=  23 ^^  28 ^^=", Tokens("| |= || ||= ^ ^= ^^ ^^="));
+  EXPECT_EQ("30 -  40 -=  38 --  47 ->  31 *  41 *=  32 /  42 /=", Tokens("- -= -- -> * *= / /="));
+  EXPECT_EQ("33 %  43 %=  34 !  44 !=  35 =  45 ==  36 ?  46 ?=", Tokens("% %= ! != = == ? ?="));
+  EXPECT_EQ("48 :  49 ::  50 $  51 $$  52 .  53 ,  54 ;  55 (  56 )", Tokens(": :: $ $$ . , ; ( )"));
+  EXPECT_EQ("57 {  58 }  59 [  60 ]  61 ~  62 @  63 \\  64 `  65 #", Tokens("{}[]~@\\`#"));
+  EXPECT_EQ("8 a  37 ++  29 +  8 b", Tokens("a+++b"));
+  EXPECT_EQ("8 x  38 --  10 >  8 y", Tokens("x-->y"));
+  EXPECT_EQ("31 *  31 *  31 *  47 ->  31 *  51 $$  50 $  49 ::  48 :", Tokens("***->*$$$:::"));
+  EXPECT_EQ("36 ?  48 :  19 <<  35 =", Tokens("?: << ="));
+  EXPECT_EQ("  !Invalid token ++= at 3", Tokens("++= "));
+  EXPECT_EQ("8 a  !Bad token '\\x7f' at 2", Tokens("a \x7f"));
+  EXPECT_EQ("  !Bad token '\\xc8' at 0", Tokens("\xc8"));
+  EXPECT_EQ("  !Bad token '\\0' at 0", Tokens(std::string(1, '\0')));
+}
+
+TEST(ScannerTest, WordsAndComments) {
+  EXPECT_EQ("", Tokens(""));
+  EXPECT_EQ("8 _a1  8 b  8 r  8 R  8 rx", Tokens("_a1\t\v\f\r\nb r R rx"));
+  EXPECT_EQ("8 a  8 c", Tokens("a//b\nc /* * / */"));
+  EXPECT_EQ("8 a  1 //b  8 c  1 /* * /\n*/  32 /", Tokens("a//b\nc/* * /\n*/ /", true));
+  EXPECT_EQ("2 @//x  2 @/*y*/  62 @  32 /  62 @", Tokens("@//x\n@/*y*/@ / @"));
+  EXPECT_EQ("8 a  !Met EOS in middle of /* ... */ comment at 5", Tokens("a /*/"));
+  LexScanner scanner;
+  EXPECT_EQ(kEndOfText, NextToken(scanner).kind);
+  EXPECT_EQ(kEndOfText, NextToken(scanner).kind);
+}
+
+TEST(ScannerTest, Numbers) {
+  EXPECT_EQ("3 0  3 007  4 0x1f  4 0XA  5 1.5  5 1e5  5 1E+5  5 0.1e-3", Tokens("0 007 0x1f 0XA 1.5 1e5 1E+5 0.1e-3"));
+  EXPECT_EQ("3 12  8 abc  5 1.5  52 .  3 2  52 .  3 5  4 0x1  8 g  3 1  8 u", Tokens("12abc 1.5.2 .5 0x1g 1u"));
+  EXPECT_EQ("  !Expected hex digit (not EOS) after 0x at 2", Tokens("0x"));
+  EXPECT_EQ("  !Expected hex digit (not 'Z') after 0x at 2", Tokens("0xZ"));
+  EXPECT_EQ("  !Expected digit (not EOS) after decimal point (ie after reading '1.') at 2", Tokens("1."));
+  EXPECT_EQ("  !Expected digit(s) (not EOS) for exponent after reading 1e at 2", Tokens("1e"));
+  EXPECT_EQ("  !Expected digit(s) (not ' ') for exponent after reading 1.5e+ at 5", Tokens("1.5e+ 1"));
+  const auto token = [](const char* text) { return LexToken{kDecimal, TextRange(std::string_view(text))}; };
+  EXPECT_EQ(7u, DecimalValue64(token("007")));
+  EXPECT_EQ(0u, DecimalValue64(token("18446744073709551616")));
+  EXPECT_EQ(1u, DecimalValue32(token("4294967297")));
+  EXPECT_EQ(31u, HexValue64(token("0X1F")));
+  EXPECT_EQ(1u, HexValue64(token("0xF0000000000000001")));
+  EXPECT_EQ(0.125, FloatValue(token("1.25e-1")));
+}
+
+TEST(ScannerTest, Strings) {
+  EXPECT_EQ("7 \"\"  6 ''  7 r\"\"  7 R\"a\\\"  6 r'\"'  7 \"\\\"\\x4f\"",
+            Tokens("\"\" '' r\"\" R\"a\\\" r'\"' \"\\\"\\x4f\""));
+  EXPECT_EQ("  !Met EOS within double quoted string at 1", Tokens("\""));
+  EXPECT_EQ("  !Met EOS within single quoted string after reading r'a at 3", Tokens("r'a"));
+  EXPECT_EQ("  !Met line feed within double quoted string after reading \"ab at 3", Tokens("\"ab\n\""));
+  EXPECT_EQ("  !Invalid escape character 'q' following backslash at 2", Tokens("\"\\q\""));
+  EXPECT_EQ("  !Expected hex character when read '\\\"' at 4", Tokens("\"\\x4\""));
+  EXPECT_EQ("  !Expected hex character when reached EOS at 3", Tokens("\"\\x"));
+  EXPECT_EQ("  !Expected escape character following backslash when reached EOS at 2", Tokens("\"\\"));
+
+  const auto decode = [](const char* text, int32_t kind = kDoubleQuoted) {
+    std::string decoded = "old";
+    DecodeString({kind, TextRange(std::string_view(text))}, decoded);
+    return decoded;
+  };
+  EXPECT_EQ("a\tbA", decode("\"a\\tb\\x41\""));
+  EXPECT_EQ("\r\n\a\b\f\t\v\"\\'?", decode("'\\r\\n\\a\\b\\f\\t\\v\\\"\\\\\\'\\?'", kSingleQuoted));
+  EXPECT_EQ(std::string(1, '\0'), decode("\"\\0\""));
+  EXPECT_EQ("a\\x", decode("r\"a\\x\""));
+
+  EXPECT_EQ("\\t\\0\\xc8\\?\\\\\\\"\\'a~\\x7f", EscapedString(std::string("\t\0\xc8?\\\"'a~\x7f", 10)));
+}
+
+TEST(ScannerTest, QuotedText) {
+  const auto read = [](const std::string& text) {
+    return Outcome(text, [&](LexScanner& scanner) {
+      std::string out;
+      ReadQuotedText(scanner, out);
+      return out + " up to " + scanner.Text();
+    });
+  };
+  EXPECT_EQ("a\tA'b up to \" c", read("\"a\\t\\x41'b\" c"));
+  EXPECT_EQ(" up to '", read("''"));
+  EXPECT_EQ("Expected quoted string at 0", read(""));
+  EXPECT_EQ("Expected quoted string at 1", read("\""));
+  EXPECT_EQ("ab c isn't a quoted string at 0", read("ab c"));
+  EXPECT_EQ("Met EOS in middle of string at 2", read("\"a"));
+  EXPECT_EQ("Met EOS in middle of string at 2", read("\"\\"));
+  EXPECT_EQ("Met end of line in middle of string at 2", read("\"a\n\""));
+  EXPECT_EQ("'q'is not a valid escape character at 2", read("\"\\q\""));
+  EXPECT_EQ("Expected hex character when reached EOS at 3", read("\"\\x"));
+  EXPECT_EQ("Expected hex character when read 'g' at 4", read("\"\\x4g\""));
+}
+
+TEST(ScannerTest, LinesAndEquality) {
+  const std::string text = "a\n\nb";
+  const TextRange range{std::string_view(text)};
+  EXPECT_EQ(1, LineOfPosition(range, text.data() + 1));
+  EXPECT_EQ(2, LineOfPosition(range, text.data() + 2));
+  EXPECT_EQ(3, LineOfPosition(range, text.data() + 4));
+  EXPECT_EQ(-1, LineOfPosition(range, text.data() + 5));
+  const auto same = [](std::string_view a, std::string_view b) { return SameTokens(LexScanner(a), LexScanner(b)); };
+  EXPECT_TRUE(same("a +b // c", "a\n+ /* d */ b"));
+  EXPECT_FALSE(same("a b", "a"));
+  EXPECT_FALSE(same("a", "a b"));
+  EXPECT_FALSE(same("\"a\"", "'a'"));
+}
+
+TEST(ScannerTest, Parser) {
+  ParserBase parser;
+  const auto fails = [&](std::string_view text, auto act) {
+    return Outcome(std::string(text), [&](LexScanner& scanner) {
+      parser = ParserBase();
+      parser.SetInput(scanner);
+      return act(), std::string("none");
+    });
+  };
+  EXPECT_EQ("Expected { after EOS when read a at 0", fails("a", [&] { parser.Expect(kOpenBrace, "{"); }));
+  EXPECT_EQ("Expected identifier after a when read EOS at 1", fails("a", [&] {
+              EXPECT_EQ("a", parser.ReadIdentifier());
+              parser.ReadIdentifier();
+            }));
+  EXPECT_EQ("none", fails("{", [&] { parser.Expect(kOpenBrace, "{"); }));
+  EXPECT_EQ(kOpenBrace, parser.previous.kind);
+
+  const auto printed = [](const char* file, int64_t line) {
+    LexScannerException exception("no", nullptr);
+    exception.file = file;
+    exception.line = line;
+    return ExceptionText(exception);
+  };
+  EXPECT_EQ("a(3) : error : no", printed("a", 3));
+  EXPECT_EQ("a : error : no", printed("a", -1));
+  EXPECT_EQ("Line 3: error : no", printed("", 3));
+  EXPECT_EQ("error : no", printed("", -1));
+}
+
+// --- Sections
+
+TEST(SectionsTest, Brackets) {
+  const auto section = [](const std::string& text, bool openAlreadyRead = false) {
+    return Outcome(text, [&](LexScanner& scanner) {
+      const TextRange range = ReadParenSection(scanner, openAlreadyRead);
+      return "<" + range.Text() + ">" + scanner.Text();
+    });
+  };
+  EXPECT_EQ("<> x", section("() x"));
+  EXPECT_EQ("<>", section(" ( )"));
+  EXPECT_EQ("<a (b) c>", section("( a (b) c /* ) */ )"));
+  EXPECT_EQ("<a \"(\" b ]}>;", section("(a \"(\" b ]});"));
+  EXPECT_EQ("<a>)", section("a))", true));
+  EXPECT_EQ("( expected when read [ at 1", section(" [a]"));
+  EXPECT_EQ("( expected when read EOS at 0", section(""));
+  EXPECT_EQ("Met EOS while reading bracketted section at 4", section("(a( "));
+  const std::string deep = std::string(1000000, '(') + std::string(1000000, ')');
+  EXPECT_EQ("<" + deep.substr(1, deep.size() - 2) + ">", section(deep));
+}
+
+TEST(SectionsTest, Arguments) {
+  const auto arguments = [](const std::string& text) {
+    return Outcome(text, [&](LexScanner& scanner) {
+      std::string list;
+      for (;;) {
+        TextRange argument;
+        const LexToken end = ReadArgument(scanner, argument, kCloseParen);
+        list += "<" + argument.Text() + ">";
+        if (end.kind != kComma) return list + Printed(end) + scanner.Text();
+      }
+    });
+  };
+  EXPECT_EQ("<a><b>);", arguments("a, b);"));
+  EXPECT_EQ("<f(1, 2)><g[3, 4]>)", arguments("f(1, 2) , g[3, 4] /* c */)"));
+  EXPECT_EQ("<><>)", arguments(",)"));
+  EXPECT_EQ("<a,(b>) )", arguments(" `a,(b`) )"));
+  EXPECT_EQ("<a>x", arguments("`a`x"));
+  EXPECT_EQ("<({)><]>)", arguments("({), ])"));
+  EXPECT_EQ("Met EOS while reading argument b  at 5", arguments("a, b "));
+  EXPECT_EQ("Met EOS while reading argument (a, b) at 6", arguments("(a, b)"));
+  EXPECT_EQ("Met EOS while reading argument `a at 2", arguments("`a"));
+}
+
+TEST(SectionsTest, Blocks) {
+  const auto block = [](const std::string& text, bool paren = false) {
+    return Outcome(text, [&](LexScanner& scanner) {
+      int indent = -1;
+      const TextRange range = paren ? ReadParenBlock(scanner, indent) : ReadBraceBlock(scanner, indent);
+      return std::to_string(indent) + "<" + range.Text() + ">" + scanner.Text();
+    });
+  };
+  EXPECT_EQ("0< x >;", block("  { x };"));
+  EXPECT_EQ("0<x + y // c>\nz", block(" x + y // c\nz"));
+  EXPECT_EQ("0<x>\r\nz", block("x\r\nz"));
+  EXPECT_EQ("0<  a\n  >\n", block("{\r\n  a\n  }\n"));
+  EXPECT_EQ("4<a\n      b>\n", block("\n  {\n    a\n      b\n  }\n"));
+  EXPECT_EQ("5<a\r\n\tb>", block("\r\n{\r\n\t a\r\n\tb\r\n}"));
+  EXPECT_EQ("2<a // }\n b>", block("\n{ \n  a // }\n b  }"));
+  EXPECT_EQ("0<>x", block("\n{\n}x"));
+  EXPECT_EQ("0<>x", block("\n{  }x"));
+  EXPECT_EQ("0<{}>", block("{{}}"));
+  EXPECT_EQ("Expected { when read EOS at 2", block("  "));
+  EXPECT_EQ("Expected { when read x at 1", block("\nx"));
+  EXPECT_EQ("Expected ( when read x at 0", block("x", true));
+  EXPECT_EQ("Expected ( when read { at 2", block(" \n{", true));
+  EXPECT_EQ("Met EOS before closing } at 1", block("{"));
+  EXPECT_EQ("Met EOS while reading bracketted string at 4", block("(a()", true));
+  EXPECT_EQ("Met EOS before closing } at 3", block("\n{ "));
+}
+
+}  // namespace qrex

@@ -1,0 +1,191 @@
+// Names, imports and substitutions of frames; the map from the output back to the source.
+
+#include "expand_fixture.h"
+
+namespace qrex {
+
+class FrameTest : public ::testing::Test {
+ protected:
+  static void Define(LSFrame& frame, const char* name, const char* value) {
+    frame.AddVariable(std::make_unique<LSVar>(name, value));
+  }
+  static std::string Find(const LSFrame& frame, const char* name) {
+    try {
+      const LSVariable* found = frame.Find(name, nullptr);
+      return found ? found->ValueText() : "none";
+    } catch (const LexScannerException& exception) {
+      return exception.message;
+    }
+  }
+
+  LSFileFrame a, b, c, d;
+};
+
+TEST_F(FrameTest, NearerDefinitionsHide) {
+  LSFrame child(&a);
+  a.AddImport(b);
+  Define(b, "x", "b");
+  EXPECT_EQ("b", Find(child, "x"));
+  Define(a, "x", "a");
+  EXPECT_EQ("a", Find(child, "x"));
+  Define(child, "x", "child");
+  Define(child, "x", "newer");
+  EXPECT_EQ("newer", Find(child, "x"));
+  EXPECT_EQ("newer", child.FindInChain("x")->ValueText());
+  EXPECT_EQ(nullptr, child.FindInFrame("y", nullptr));
+  EXPECT_EQ("none", Find(child, "y"));
+}
+
+TEST_F(FrameTest, ImportsThatDisagree) {
+  Define(d, "x", "d");
+  b.AddImport(d);
+  c.AddImport(d);
+  a.AddImport(b);
+  a.AddImport(c);
+  EXPECT_EQ("d", Find(a, "x"));  // one variable by two ways
+  Define(b, "x", "b");
+  EXPECT_EQ("Ambiguous macro name : x", Find(a, "x"));
+  Define(c, "x", "c");
+  EXPECT_EQ("Ambiguous macro name : x", Find(a, "x"));
+  EXPECT_EQ("b", Find(b, "x"));
+  LSFileFrame e;
+  e.AddImport(b);
+  EXPECT_EQ("b", Find(e, "x"));  // the nearer one, though d is in view
+}
+
+TEST_F(FrameTest, NamesEndWithTheirFrame) {
+  {
+    LSFileFrame other;
+    Define(other, "x", "other");
+    Define(other, "x", "newer");
+  }
+  a.AddImport(b);
+  EXPECT_EQ("none", Find(a, "x"));
+  Define(b, "x", "b");
+  EXPECT_EQ("b", Find(a, "x"));
+  EXPECT_EQ("b", Find(b, "x"));
+}
+
+TEST_F(FrameTest, Substitutions) {
+  a.AddOrderedImport(b);
+  a.AddOrderedImport(c);
+  b.AddOrderedImport(d);
+  a.AddImport(d);
+  d.DefineSubstitution("x", "of d");
+  c.DefineSubstitution("x", "of c");
+  c.DefineSubstitution("y", "<$(x)>");
+  std::string text = "$(x) $(y) $(z) $() $(1) $(x";
+  EXPECT_TRUE(a.Substitute(text));
+  EXPECT_EQ("of d <of d> $(z) $() $(1) $(x", text);  // in the order of the imports, depth first
+  a.DefineSubstitution("x", "1");
+  a.DefineSubstitution("x", "2");
+  text = "$(x)$$(x)";
+  EXPECT_TRUE(a.Substitute(text));
+  EXPECT_EQ("2$2", text);
+  EXPECT_EQ("2", Find(a, "_x_"));
+  EXPECT_FALSE(a.Substitute(text));
+}
+
+TEST_F(FrameTest, Dump) {
+  const std::string text = "@def m(x,int y) = x + y\n@let int i = 4\n";
+  ExpandToString(nullptr, a, TextRange(std::string_view(text)));
+  LSFrame child(&a);
+  MemoryTextWriter writer;
+  child.WriteFrame(writer);
+  EXPECT_EQ(
+      "{\n    Local vars\n    [\n    ]\n    Parent frame\n    {\n        Local vars\n        [\n        i = 4\n"
+      "        m(x,y) = x + y\n        ]\n    }\n}\n",
+      writer.TakeText());
+}
+
+// --- Source maps
+
+// The runs as "begin+length" of the source text, "=" in front of a generated one, "indent" for blanks.
+std::string Runs(const SourceMap& map, const std::string& source) {
+  std::string runs;
+  for (const SourceMapRun& run : map) {
+    if (!runs.empty()) runs += " ";
+    if (!run.sourceBegin) {
+      runs += "indent+" + std::to_string(run.generatedLength);
+    } else {
+      runs += (run.generatedLength ? "=" : "") + std::to_string(run.sourceBegin - source.data()) + "+" +
+              std::to_string(run.OutputLength());
+    }
+  }
+  return runs;
+}
+
+TEST(SourceMapTest, Sink) {
+  const std::string source = "ab\ncd";
+  const TextRange whole{std::string_view(source)};
+  ExpansionSink sink;
+  sink.WriteVerbatim(whole, 0);
+  EXPECT_EQ("0+5", Runs(sink.map, source));
+  sink = {};
+  sink.WriteVerbatim(whole, 4);
+  EXPECT_EQ("    ab\n    cd", sink.output);
+  EXPECT_EQ("indent+4 0+3 indent+4 3+2", Runs(sink.map, source));
+  EXPECT_EQ(6, sink.column);
+  sink.WriteGenerated("\t1\n2", {source.data() + 1, source.data() + 2}, 4);
+  EXPECT_EQ("    ab\n    cd\t1\n    2", sink.output);
+  EXPECT_EQ("indent+4 0+3 indent+4 3+2 =1+8", Runs(sink.map, source));
+  EXPECT_EQ(5, sink.column);
+  sink.WriteGenerated("", whole, 4);
+  sink.WriteVerbatim({source.data() + 2, source.data() + 2}, 4);
+  EXPECT_EQ(5u, sink.map.size());
+  EXPECT_EQ(nullptr, MapOutputOffset(sink.map, 3));
+  EXPECT_EQ(source.data(), MapOutputOffset(sink.map, 4));
+  EXPECT_EQ(source.data() + 4, MapOutputOffset(sink.map, 12));
+  EXPECT_EQ(source.data() + 1, MapOutputOffset(sink.map, 20));
+  MapCursor cursor(sink.map);
+  for (int64_t offset = 0; offset < 21; ++offset) {
+    EXPECT_EQ(MapOutputOffset(sink.map, offset), cursor.Map(offset)) << offset;
+  }
+  EXPECT_THROW(MapOutputOffset(sink.map, 21), ExceptionBase);
+}
+
+TEST(SourceMapTest, Expansions) {
+  const std::string source = "x@//\n\n  m \"$(v)\" @@y @(1 + 1)\n@if (true)\n{\n  m\n  n\n}\n";
+  LSFileFrame frame;
+  frame.AddVariable(std::make_unique<LSVar>("m", "long"));
+  frame.DefineSubstitution("v", "w");
+  SourceMap map;
+  const std::string output = ExpandToStringWithMap(nullptr, frame, TextRange(std::string_view(source)), 0, 0, map);
+  EXPECT_EQ("x  long \"w\" y 2\nlong\nn\n", output);
+  EXPECT_EQ("0+1 6+2 =8+4 9+1 =10+3 16+1 19+2 =21+1 29+1 =45+4 46+1 49+1 52+1", Runs(map, source));
+}
+
+TEST(SourceMapTest, Positions) {
+  SourceFileList files;
+  for (const char* text : {"a\nb", "c\n"}) {
+    files.push_back(std::make_unique<MpfwSourceFile>());
+    files.back()->path = "f" + std::to_string(files.size());
+    files.back()->text = text;
+  }
+  const auto report = [&](const char* position) {
+    MemoryTextWriter writer;
+    ReportParseError(files, writer, LexScannerException("no", position));
+    return writer.TakeText();
+  };
+  EXPECT_EQ("\nf1(1) : no\n", report(files[0]->text.data()));
+  EXPECT_EQ("\nf1(2) : no\n", report(files[0]->text.data() + 3));
+  EXPECT_EQ("\nf2(1) : no\n", report(files[1]->text.data() + 1));
+  EXPECT_EQ("\nf2(2) : no\n", report(files[1]->text.data() + 2));
+  EXPECT_EQ("\nno\n", report(nullptr));
+
+  const std::string output = "12";
+  const TextRange range{std::string_view(output)};
+  const char* source = files[0]->text.data();
+  const SourceMap map{{source, source + 2, 0}};
+  const auto mapped = [&](const char* position) {
+    LexScannerException exception("no", position);
+    MapErrorPosition(map, range, exception);
+    return exception.position;
+  };
+  EXPECT_EQ(source + 1, mapped(output.data() + 1));
+  EXPECT_EQ(source + 1, mapped(output.data() + 2));  // the end counts as the last byte
+  EXPECT_EQ(source + 3, mapped(source + 3));
+  EXPECT_EQ(nullptr, mapped(nullptr));
+}
+
+}  // namespace qrex

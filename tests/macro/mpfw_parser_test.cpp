@@ -1,0 +1,156 @@
+// Loading of source files, imports, and the statements that the file languages share.
+
+#include "macro/mpfw_parser.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+#include "text/files.h"
+#include "text/trace.h"
+
+namespace qrex {
+
+class MpfwParserTest : public ::testing::Test, public TraceHook {
+ protected:
+  struct Parser : MpfwParser {
+    Parser(MpfwContext& context, std::string root) : MpfwParser(context), root(std::move(root)) {}
+    bool ResolveImport(const std::string& path, std::string& found) override {
+      found = root + "/" + path;
+      return path == "missing" || FileExists(found);
+    }
+    void OnImportedFile(MpfwSourceFile& file) override { imported += file.path.substr(root.size() + 1) + ";"; }
+    std::string root, imported;
+  };
+
+  MpfwParserTest() : root(::testing::TempDir() + "/qrex_mpfw") {
+    SetTraceHook(this);
+    CreateDirectories(root, true);
+  }
+  ~MpfwParserTest() override {
+    SetTraceHook(nullptr);
+    std::filesystem::remove_all(root);
+  }
+  void OnTrace(std::string_view text) override { trace.append(text); }
+
+  void AddFile(const std::string& name, const std::string& text) { ReplaceFile(root + "/" + name, text); }
+  std::string Load(const std::string& name, const std::string& extraText = {}) {
+    const MpfwSourceFile* file = parser.LoadSourceFile(root + "/" + name, extraText);
+    return file ? file->expansion : "none";
+  }
+  // What `act` answers with the text as input, or the error's message.
+  template <typename Act>
+  std::string With(const std::string& text, Act act) {
+    try {
+      parser.SetInput(TextRange(std::string_view(text)));
+      return act();
+    } catch (const LexScannerException& exception) {
+      return exception.message;
+    }
+  }
+
+  const std::string root;
+  std::string trace;
+  SourceFileList sources;
+  MpfwContext context{sources};
+  Parser parser{context, root};
+};
+
+TEST_F(MpfwParserTest, LoadsAndImports) {
+  AddFile("a", "@import \"b\"\r\n@importpath \"$(p)\\\\q/\"\r@$p = \"1\"@importpath (\"$\" + \"(p)\")\nf");
+  AddFile("b", "@def f = imported\n@$p = \"0\"\n");
+  EXPECT_EQ("@import \"b\"\n\n\nimported g", Load("a", " g"));
+  EXPECT_EQ((std::vector<std::string>{"0/q", "1"}), context.importPaths);
+  EXPECT_EQ(2u, sources.size());
+  EXPECT_EQ("", trace);
+}
+
+TEST_F(MpfwParserTest, ReportsErrors) {
+  AddFile("a", "x\n@import \"b\"\n");
+  AddFile("b", "\n\n@fail(\"no\")");
+  EXPECT_EQ("none", Load("a"));
+  EXPECT_EQ("\n" + root + "/b(3) : no\n\n" + root + "/a(2) : Can't import file: b\n", trace);
+  trace.clear();
+  AddFile("a", "\n@import \"c$(v)\"");
+  EXPECT_EQ("none", Load("a"));
+  EXPECT_EQ("\n" + root + "/a(2) : Couldn't open file c$(v)\n", trace);
+  EXPECT_EQ("Couldn't open file " + root + "/none", With("", [&] { return Load("none"); }));
+  trace.clear();
+  AddFile("self", "@import \"self\"");
+  EXPECT_EQ("none", Load("self"));
+  EXPECT_EQ(0u,
+            trace.find("\n" + root + "/self(1) : Imports nested too deeply\n\n" + root + "/self(1) : Can't import"));
+}
+
+TEST_F(MpfwParserTest, ReadsStrings) {
+  context.rootFrame.DefineSubstitution("v", "value");
+  std::string out;
+  const auto read = [&](const std::string& text, void (MpfwParser::*reader)(std::string&)) {
+    return With(text, [&] {
+      (parser.*reader)(out);
+      return out + "|" + Printed(parser.current);
+    });
+  };
+  EXPECT_EQ("a value|'a $(v)'", read("'a $(v)' x", &MpfwParser::ReadString));
+  EXPECT_EQ("Expected quoted string when read x", read("x", &MpfwParser::ReadString));
+  EXPECT_EQ("a/b|\"a/b\"", read("\"a/b\"", &MpfwParser::ReadPath));
+  EXPECT_EQ("Forward slashes must be used in \"a\\\\b\"", read("\"a\\\\b\"", &MpfwParser::ReadPath));
+  EXPECT_EQ("a|x", read("\"a\" x", &MpfwParser::ReadStringOrExpression));
+  EXPECT_EQ("value1|x", read("(\"$(v)\" + string(1)) x", &MpfwParser::ReadStringOrExpression));
+  EXPECT_EQ("No implicit conversion from int64 to string", read("(1)", &MpfwParser::ReadStringOrExpression));
+  EXPECT_EQ("Expected ) after \"a\" when read ;", read("(\"a\";", &MpfwParser::ReadStringOrExpression));
+  EXPECT_EQ("Expected quoted string when read 1", read("1", &MpfwParser::ReadStringOrExpression));
+}
+
+TEST_F(MpfwParserTest, ReadsNamedStrings) {
+  const auto read = [&](const std::string& text, bool isPath) {
+    return With(text, [&] {
+      std::string out = "old";
+      isPath ? parser.ReadNamedPath("N", out) : parser.ReadNamedString("N", out);
+      return out + "|" + Printed(parser.current);
+    });
+  };
+  EXPECT_EQ("$(x)|\"$(x)\"", read("$N = \"$(x)\" y", false));
+  EXPECT_EQ("Expected '$' when read N", read("N", false));
+  EXPECT_EQ("Expected 'N' when read M", read("$M", false));
+  EXPECT_EQ("Expected quoted string when read 'a'", read("$N = 'a'", false));
+  EXPECT_EQ("a/b|EOS", read("$N = \"a/b\"", true));
+  EXPECT_EQ("|y", read("$N = \"\" y", true));
+  EXPECT_EQ("Forward slashes must be used in \"a\\\\b\"", read("$N = \"a\\\\b\"", true));
+  EXPECT_EQ("Path can't end with a trailing slash : \"a/\"", read("$N = \"a/\"", true));
+}
+
+TEST_F(MpfwParserTest, Statements) {
+  const auto import = [&](const std::string& text) {
+    return With(text, [&] {
+      const bool parsed = parser.ParseImportStatement();
+      return std::string(parsed ? "yes|" : "no|") + Printed(parser.current);
+    });
+  };
+  AddFile("a", "");
+  EXPECT_EQ("no|x", import("x"));
+  EXPECT_EQ("yes|x", import("@import \"a\" x"));
+  EXPECT_EQ("", parser.imported);  // it was never loaded
+  Load("a");
+  EXPECT_EQ("yes|x", import("@import \"a\" x"));
+  EXPECT_EQ("a;", parser.imported);
+  EXPECT_EQ("Syntax error: @x", import("@x"));
+  EXPECT_EQ("Expected quoted string when read x", import("@import x"));
+  EXPECT_EQ("Couldn't open file none", import("@import \"none\""));
+
+  const auto define = [&](const std::string& text) {
+    return With(text, [&] {
+      const bool defined = parser.ParseVariableStatement();
+      const std::string* value = context.rootFrame.FindSubstitution("x");
+      return (defined ? "" : "no ") + (value ? *value : "none");
+    });
+  };
+  EXPECT_EQ("no none", define("x"));
+  EXPECT_EQ("a/b", define("$x = path \"a\\\\b/\""));
+  EXPECT_EQ("a\\b/", define("$x = \"a\\\\b/\""));
+  EXPECT_EQ("ab", define("$x = (\"a\" + \"b\")"));
+  EXPECT_EQ("Expected identifier after $ when read 1", define("$1"));
+  EXPECT_EQ("Expected = after x when read ;", define("$x ;"));
+}
+
+}  // namespace qrex

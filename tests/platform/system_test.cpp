@@ -1,0 +1,112 @@
+// What the layer makes of the system below: commands, error codes, file times, a stack of any size.
+
+#include "platform/system.h"
+
+#include <gtest/gtest.h>
+
+#include <cstdlib>
+#include <filesystem>
+
+#include "platform/console.h"
+#include "platform/error.h"
+#include "platform/file_system.h"
+
+namespace qrex::platform {
+
+TEST(SystemTest, Commands) {
+  EXPECT_EQ(3, RunCommand("cmd /c exit 3"));
+  EXPECT_EQ(0, RunCommand("true"));
+  EXPECT_EQ(127, RunCommand("cmd /c command-that-is-nowhere 2>/dev/null"));
+  SetEnvironment("QREX_TEST", "a b");
+  EXPECT_EQ(0, RunCommand("test \"$QREX_TEST\" = 'a b'"));
+}
+
+TEST(SystemTest, CompilerOfTheGccFamily) {
+  const std::string directory = ::testing::TempDir() + "/qrex_path";
+  std::filesystem::create_directories(directory);
+  ASSERT_TRUE(WriteFile(directory + "/gcc", "#!/bin/sh\nexit 7\n", false));
+  std::filesystem::permissions(directory + "/gcc", std::filesystem::perms::owner_all);
+  const std::string path = std::getenv("PATH");
+  SetEnvironment("PATH", directory + ":/bin:/usr/bin");
+  EXPECT_EQ(7, RunCommand("cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
+  std::filesystem::rename(directory + "/gcc", directory + "/gcc-4");
+  EXPECT_EQ(7, RunCommand("gcc-4 x"));
+  SetEnvironment("PATH", path);
+  std::filesystem::remove_all(directory);
+}
+
+TEST(SystemTest, BatchFile) {
+  const std::string path = ::testing::TempDir() + "/qrex_mark.bat", target = ::testing::TempDir() + "/qrex_mark.dep";
+  std::string backslashes = path;
+  for (char& c : backslashes) c = c == '/' ? '\\' : c;
+  ASSERT_TRUE(WriteFile(path, "@echo Updated %TIME% %DATE% >\"" + target + "\"\n", false));
+  EXPECT_EQ(0, RunCommand("cmd /c \"" + backslashes + "\""));
+  std::string content;
+  EXPECT_TRUE(ReadFile(target, content));
+  EXPECT_EQ(0u, content.find("Updated "));
+  EXPECT_EQ(std::string::npos, content.find('%'));
+  RemoveFile(path);
+  RemoveFile(target);
+  EXPECT_NE(0, RunCommand("cmd /c \"" + backslashes + "\""));
+}
+
+TEST(SystemTest, DeepStack) {
+  struct Deep {
+    static size_t Recurse(size_t depth) {
+      volatile char frame[1024];
+      frame[0] = static_cast<char>(depth);
+      return depth == 0 ? static_cast<size_t>(frame[0]) : 1 + Recurse(depth - 1);
+    }
+  };
+  size_t depth = 0;
+  RunOnStack(size_t{1} << 28, [&] { depth = Deep::Recurse(60000); });
+  EXPECT_EQ(60000u, depth);
+  EXPECT_THROW(RunOnStack(1 << 20, [] { throw 1; }), int);
+}
+
+TEST(SystemTest, Times) {
+  constexpr int64_t kTheYear2000 = 125911584000000000, kTenYears = int64_t{10} * 366 * 24 * 3600 * 10000000;
+  EXPECT_GT(SystemFileTime(), kTheYear2000 + 2 * kTenYears);
+  const std::string path = ::testing::TempDir() + "/qrex_time";
+  ASSERT_TRUE(WriteFile(path, "", false));
+  FileInfo info;
+  ASSERT_TRUE(Stat(path, info));
+  EXPECT_LT(std::abs(SystemFileTime() - info.writeTime), 100000000);
+  EXPECT_EQ("qrex_time", info.name);
+  RemoveFile(path);
+}
+
+TEST(ErrorTest, Codes) {
+  const std::string path = ::testing::TempDir() + "/qrex_error";
+  ASSERT_TRUE(WriteFile(path, "x", false));
+  std::string content;
+  EXPECT_FALSE(ReadFile(path + "none", content));
+  EXPECT_EQ(2u, LastError());
+  EXPECT_FALSE(ReadFile(path + "/a", content));
+  EXPECT_EQ(3u, LastError());
+  EXPECT_FALSE(ReadFile(::testing::TempDir(), content));
+  EXPECT_EQ(5u, LastError());
+  EXPECT_FALSE(WriteFile(path, "y", true));
+  EXPECT_EQ(80u, LastError());
+  SetReadOnlyAttribute(path, true);
+  EXPECT_FALSE(WriteFile(path, "y", false));  // also for the superuser
+  EXPECT_EQ(5u, LastError());
+  EXPECT_FALSE(RemoveFile(path));
+  SetReadOnlyAttribute(path, false);
+  EXPECT_TRUE(RemoveFile(path));
+  std::string sentence;
+  EXPECT_FALSE(ErrorSentence(12345, sentence));
+  EXPECT_TRUE(ErrorSentence(3, sentence));
+  EXPECT_EQ("The system cannot find the path specified.", sentence);
+}
+
+TEST(ConsoleTest, Utf8) {
+  EXPECT_TRUE(IsValidUtf8("a\xc3\xa9\xe2\x82\xac\xf0\x9f\x98\x80"));
+  for (const char* wrong :
+       {"\x80", "\xc0\x80", "\xc3", "\xe0\x9f\x80", "\xed\xa0\x80", "\xf4\x90\x80\x80", "\xf5\x80\x80\x80"}) {
+    EXPECT_FALSE(IsValidUtf8(wrong));
+  }
+  EXPECT_EQ("\xc3\xa9|\xc3\xa9\xc2\x80", WidenBytes("\xc3\xa9|\xe9\x80"));
+}
+
+}  // namespace qrex::platform

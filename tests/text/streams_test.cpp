@@ -1,0 +1,200 @@
+// Streams, the indenting writer, the trace log.
+
+#include "text/streams.h"
+
+#include <gtest/gtest.h>
+
+#include <filesystem>
+
+#include "text/files.h"
+#include "text/scope_timer.h"
+#include "text/stream_adapters.h"
+#include "text/trace.h"
+
+namespace qrex {
+
+TEST(StreamsTest, PagedBuffer) {
+  PagedBuffer buffer(4);
+  buffer.Write("abcd", 4);
+  EXPECT_EQ(1u, buffer.PageCount());
+  const char* first = buffer.Page(0);
+  buffer.Write("e", 1);
+  EXPECT_EQ(2u, buffer.PageCount());
+  buffer.Write("fghijk", 6);
+  EXPECT_EQ(first, buffer.Page(0));
+  std::string text = ">";
+  buffer.AppendTo(text);
+  EXPECT_EQ(">abcdefghijk", text);
+  buffer.SetSize(5, false);
+  EXPECT_EQ(3u, buffer.PageCount());
+  buffer.Write("!", 1);
+  text.clear();
+  buffer.AppendTo(text);
+  EXPECT_EQ("abcde!", text);
+  buffer.SetSize(4, true);
+  EXPECT_EQ(1u, buffer.PageCount());
+  buffer.Clear();
+  EXPECT_EQ(0u, buffer.PageCount());
+  EXPECT_EQ(0u, buffer.Size());
+}
+
+TEST(StreamsTest, Readers) {
+  PagedBuffer buffer(4);
+  PagedBufferToOutputStreamAdapter(buffer).Write("abcdefghij", 10);
+  const std::string block = "abcdefghij";
+  PagedBufferToInputStreamAdapter paged(buffer);
+  BufferToInputStreamAdapter plain(block.data(), block.size());
+  for (ISeekableInputStream* in :
+       {static_cast<ISeekableInputStream*>(&paged), static_cast<ISeekableInputStream*>(&plain)}) {
+    char bytes[16];
+    EXPECT_EQ(10, in->Length());
+    EXPECT_EQ(6u, in->Read(bytes, 6));
+    EXPECT_EQ("abcdef", std::string(bytes, 6));
+    EXPECT_EQ(6, in->Position());
+    EXPECT_EQ(4u, in->Read(bytes, 16));
+    EXPECT_EQ(0u, in->Read(bytes, 16));
+    EXPECT_TRUE(in->Seek(3));
+    EXPECT_EQ(1u, in->Read(bytes, 1));
+    EXPECT_EQ('d', bytes[0]);
+    EXPECT_FALSE(in->Seek(-1));
+  }
+  char room[4] = {};
+  BufferToOutputStreamAdapter out(room, sizeof room);
+  out.Write("abc", 3);
+  EXPECT_THROW(out.Write("de", 2), BufferOverflowException);
+  EXPECT_EQ(1u, out.Room());
+  EXPECT_EQ(0, room[3]);
+}
+
+TEST(StreamsTest, Copies) {
+  const std::string block(20000, 'x');
+  BufferToInputStreamAdapter in(block.data(), block.size());
+  MemoryTextWriter writer;
+  EXPECT_EQ(9000, CopyStream(writer, in, 9000));
+  EXPECT_EQ(11000, CopyStream(writer, in));
+  EXPECT_EQ(block, writer.TakeText());
+}
+
+TEST(TextWriterTest, Indentation) {
+  MemoryTextWriter writer;
+  writer.AddIndent(4);
+  writer << "a\n\nb";
+  EXPECT_EQ("    a\n    \n    b", writer.TakeText());
+  writer << "c\n";
+  EXPECT_EQ("c\n", writer.TakeText());
+  writer << 'd' << std::string(5000, 'e') << "\n";
+  EXPECT_EQ("    d" + std::string(5000, 'e') + "\n", writer.TakeText());
+  writer << "x\n";
+  {
+    IndentScope outer(writer, -4);
+    writer << "y\n";
+    {
+      IndentScope inner(writer, -4);
+      writer << "z\n";
+    }
+    writer << "w\n";
+  }
+  writer << "v";
+  EXPECT_EQ("    x\ny\nz\nw\n    v", writer.TakeText(false));
+  EXPECT_EQ("    x\ny\nz\nw\n    v", writer.TakeText());
+  EXPECT_EQ("", writer.TakeText());
+  EXPECT_EQ(4, writer.Indent());
+}
+
+TEST(TextWriterTest, Values) {
+  MemoryTextWriter writer;
+  writer << -1 << ' ' << uint64_t{18446744073709551615u} << ' ' << int64_t{INT64_MIN} << ' ' << 0.1 << ' ' << 1e30
+         << ' ' << 2.0f << ' ' << DeserialisationException() << std::string("s") << std::string_view("v");
+  writer.EndLine();
+  EXPECT_EQ("-1 18446744073709551615 -9223372036854775808 0.1 1e+30 2 Deserialisation errorsv\n", writer.TakeText());
+}
+
+class FileStreamTest : public ::testing::Test {
+ protected:
+  FileStreamTest() : path(::testing::TempDir() + "/stream") {}
+  ~FileStreamTest() override {
+    SetReadOnly(path, false);
+    DeleteFile(path);
+  }
+  std::string Content() {
+    std::string content;
+    EXPECT_TRUE(ReadWholeFile(content, path));
+    return content;
+  }
+  const std::string path;
+};
+
+TEST_F(FileStreamTest, LineEndsInTextMode) {
+  auto* stream = new OFileStream(path, true);
+  stream->Write("a\n\nb", 4);
+  stream->Write("\n", 1);
+  stream->Flush();
+  stream->Close();
+  EXPECT_EQ("a\r\n\r\nb\r\n", Content());
+  { OFileStream(path, false).Write("a\n", 2); }
+  EXPECT_EQ("a\n", Content());
+  SetReadOnly(path, true);
+  try {
+    OFileStream refused(path, false);
+    FAIL();
+  } catch (const FileException& exception) {
+    EXPECT_EQ("File error (" + path + ") : Access is denied.", ExceptionText(exception));
+  }
+  EXPECT_THROW(OFileStream("a\xff", false), StringConversionException);
+}
+
+TEST_F(FileStreamTest, TraceLog) {
+  struct Hook : TraceHook {
+    void OnTrace(std::string_view text) override { seen.append(text); }
+    std::string seen;
+  } hook;
+  SetTraceHook(&hook);
+  CloseTrace();  // what came before is gone
+  TraceWriter() << "early\n";
+  EXPECT_FALSE(OpenTrace(path + "/none", false, false));
+  EXPECT_TRUE(OpenTrace(path, false, false));
+  EXPECT_EQ("early\n", Content());
+  {
+    TraceIndentScope indent(2);
+    TraceWriter() << "a\n\nb" << 1;
+  }
+  TraceWriter() << "\n";
+  EXPECT_EQ("early\n  a\n\n  b1\n", Content());
+  EXPECT_EQ("early\nearly\n  a\n\n  b1\n", hook.seen);
+  CloseTrace();
+  EXPECT_TRUE(OpenTrace(path, true, true));
+  TraceWriter() << "x\n";
+  EXPECT_TRUE(::testing::internal::RE::FullMatch(
+      Content().substr(15), "\\d+ \\d\\d/\\d\\d/\\d\\d\\d\\d \\d\\d:\\d\\d:\\d\\d\\.\\d\\d\\d x\n"))
+      << Content();
+  CloseTrace();
+  OpenTrace("stdout", false, false);
+  ::testing::internal::CaptureStdout();
+  TraceWriter() << "caf\xc3\xa9 \xe9\n";  // no text is lost: a byte that is no UTF-8 is taken for a character
+  EXPECT_EQ("caf\xc3\xa9 \xc3\xa9\n", ::testing::internal::GetCapturedStdout());
+  ::testing::internal::CaptureStdout();
+  EXPECT_THROW(StdioOutputStream().Write("\xe9", 1), StringConversionException);
+  StdioOutputStream().Write("ok", 2);
+  EXPECT_EQ("ok", ::testing::internal::GetCapturedStdout());
+  CloseTrace();
+  SetTraceHook(nullptr);
+}
+
+TEST(ScopeTimerTest, Line) {
+  struct Hook : TraceHook {
+    void OnTrace(std::string_view text) override { seen.append(text); }
+    std::string seen;
+  } hook;
+  SetTraceHook(&hook);
+  {
+    ScopeTimer timer;
+    timer.Stop();
+    timer.Label() << "Loading x";
+  }
+  SetTraceHook(nullptr);
+  ASSERT_EQ(100u, hook.seen.size()) << hook.seen;
+  EXPECT_EQ("Loading x" + std::string(79, '.') + " ", hook.seen.substr(0, 89));
+  EXPECT_EQ(" ms\n", hook.seen.substr(96));
+}
+
+}  // namespace qrex
