@@ -143,13 +143,12 @@ def m4_definitions():
 def calling_function(names, number):
     """Five calls in some 290 bytes."""
     a, b, f = names.name(), names.name(), names.unique(number)
-    return f"""// The {names.word()} of a {names.word()}.
-class {f} {{
+    return f"""class {f} {{
   FIELD({names.type()}, {a})
   int {names.name()}(int {b}) {{
     GUARD({names.word()}Lock);
     CHECK({b}, {names.number()})
-    for (int i = LIMIT; i > {b}; --i) {names.word()}[i] += {b} * {names.number()};
+    for (int i = LIMIT; i > {b}; --i) {names.word()}[i] += {b};
     return CLAMP({b} + {names.number()}, 0, {names.name()});
   }}
   {names.type()} m_{a};
