@@ -20,8 +20,9 @@ constexpr size_t kNameSpaceFree = 2;  // void and bool are C++'s own
 
 std::string_view ShortTemplate(uint8_t op) { return kTemplates[op - kOpPtr]; }
 
+// Of std::vector<std::string>: vector<std::string>.
 std::string_view LastPart(std::string_view name) {
-  const size_t colons = name.rfind("::");
+  const size_t colons = name.substr(0, name.find('<')).rfind("::");
   return colons == std::string_view::npos ? name : name.substr(colons + 2);
 }
 

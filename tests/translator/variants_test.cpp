@@ -399,6 +399,19 @@ TEST_F(VariantsTest, NamesOfItemsInRecords) {
   }
 }
 
+TEST_F(VariantsTest, Destructors) {
+  const std::string header = TranslateHeader(
+                                 "$enum E { a }; namespace n { $typedef xvector<int32> T; }\n$variant V "
+                                 "{ E; n::T t; xmap<int32,bool> m; std::map<int, std::string> s; int8; };")
+                                 .header;
+  EXPECT_EQ(R"(        case 0 : as<E >().E::~E(); break;
+        case 1 : as<t >().n::T::~T(); break;
+        case 2 : as<m >().vesk::xmap<vesk::int32,bool >::~xmap(); break;
+        case 3 : as<s >().std::map<int, std::string>::~map<int, std::string>(); break;
+)",
+            Section(header, "inline V::~V()\n{\n    switch(_tag)\n    {\n", "    }\n"));
+}
+
 TEST_F(VariantsTest, Messages) {
   AssertMessages({
       {"\n$variant V <<copy>> { int32; };",
