@@ -1,5 +1,6 @@
 #include "translator/qrex_parser.h"
 
+#include <algorithm>
 #include <cstring>
 
 #include "lex/literals.h"
@@ -15,32 +16,22 @@ QrexParserOutputStream::QrexParserOutputStream(IOutputStream& target, std::vecto
                                                TextRange expanded, const SourceMap& map)
     : m_target(target), m_lineTable(lineTable), m_expanded(expanded), m_map(map), m_cursor(map) {}
 
-void QrexParserOutputStream::CountColumns(std::string_view text) {
-  for (char c : text) m_column += c == '\t' ? 4 : 1;
-}
-
 void QrexParserOutputStream::Write(const void* data, size_t length) {
-  std::string_view text(static_cast<const char*>(data), length);
-  for (size_t newline; (newline = text.find('\n')) != std::string_view::npos; text.remove_prefix(newline + 1)) {
-    m_column = 0;
-    m_lineTable.push_back(SourcePosition());
-  }
-  CountColumns(text);
+  const std::string_view text(static_cast<const char*>(data), length);
+  m_lineTable.insert(m_lineTable.end(), static_cast<size_t>(std::count(text.begin(), text.end(), '\n')),
+                     SourcePosition());
   m_target.Write(data, length);
 }
 
 void QrexParserOutputStream::Flush() { m_target.Flush(); }
 
 void QrexParserOutputStream::CopyRange(const char* begin, const char* end) {
-  if (begin >= end) return;
   m_target.Write(begin, static_cast<size_t>(end - begin));
   while (const void* newline = std::memchr(begin, '\n', static_cast<size_t>(end - begin))) {
     m_copied = static_cast<const char*>(newline);
-    m_column = 0;
     m_lineTable.push_back(SourcePosition());
     begin = m_copied + 1;
   }
-  CountColumns({begin, static_cast<size_t>(end - begin)});
   m_copied = end;
 }
 
@@ -69,6 +60,7 @@ QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWr
 
 void QrexParser::CopyTo(const char* position) {
   out.Flush();
+  if (position < m_copyPosition) return;  // dealt with before
   stream.CopyRange(m_copyPosition, position);
   m_copyPosition = position;
 }

@@ -37,17 +37,14 @@ class QrexParserOutputStream : public IOutputStream {
   void CopyRange(const char* begin, const char* end);  // source text, bypassing the indentation
   const char* SourcePosition();                        // mapped position of the last source text copied; null if none
   const char* SourcePosition(const char* expanded) const;  // mapped position of an address in the expanded text
-  int Column() const { return m_column; }
 
  private:
-  void CountColumns(std::string_view text);
   IOutputStream& m_target;
   std::vector<const char*>& m_lineTable;
   TextRange m_expanded;
   const SourceMap& m_map;
   MapCursor m_cursor;
   const char* m_copied = nullptr;
-  int m_column = 0;
 };
 
 class QrexParser : public ExpressionParser {

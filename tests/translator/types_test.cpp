@@ -344,67 +344,67 @@ TEST_F(TypesTest, FieldTypes) {
     std::string message;
     return CheckType(CodeOf(text), Root(), context, message) ? "" : message;
   };
-  struct Case {
-    std::string text, inModel, serialisable, plain;  // what is wrong in each context
-  };
-  const std::string constInModel = "const or volatile qualifiers not permitted within models";
-  const Case cases[] = {
-      {"int32", "", "", ""},
-      {"const int32", constInModel, constInModel, ""},
-      {"const K*", "", "Pointers don't support serialisation", ""},
-      {"xvector<CK>", constInModel, constInModel, ""},
-      {"assignable<int32>", "", "", "assignable<> only permitted within models"},
+  const std::string noConst = "const or volatile qualifiers not permitted within models";
+  const std::array<std::string, 3> cases[] = {
+      // the type, what is wrong with it in a model, and outside
+      {"const int32", noConst, ""},
+      {"const K*", "", ""},
+      {"xvector<CK>", noConst, ""},
+      {"assignable<int32>", "", "assignable<> only permitted within models"},
       {"assignable<movable<int32>>", "assignable<> and movable<> are incompatible decorators",
-       "assignable<> and movable<> are incompatible decorators", "assignable<> only permitted within models"},
+       "assignable<> only permitted within models"},
       {"offsettable<assignable<int32>>", "assignable<> and offsetable<> are incompatible decorators",
-       "assignable<> and offsetable<> are incompatible decorators", "assignable<> only permitted within models"},
+       "assignable<> only permitted within models"},
       {"xvector<assignable<int32>>", "assignable<> not permitted here - data type is immutable",
-       "assignable<> not permitted here - data type is immutable", "assignable<> only permitted within models"},
-      {"movable<pref<n::I>>", "", "", "movable<> only permitted within models"},
+       "assignable<> only permitted within models"},
+      {"movable<pref<n::I>>", "", "movable<> only permitted within models"},
       {"movable<offsettable<int32>>", "movable<> and offsetable<> are incompatible decorators",
-       "movable<> and offsetable<> are incompatible decorators", "movable<> only permitted within models"},
-      {"xvector<movable<cref<K>>>", "", "", "movable<> only permitted within models"},
-      {"xvector<movable<int8>>", "movable<T> only permitted where T is a pref/cref",
-       "movable<T> only permitted where T is a pref/cref", "movable<> only permitted within models"},
-      {"xvector<xmap<int8,movable<pref<n::I>>>>", "movable<> not permitted here", "movable<> not permitted here",
        "movable<> only permitted within models"},
-      {"offsettable<int8>", "", "", "offsetable<> only permitted within models"},
-      {"offsettable<bool>", "Only integral types are offsetable", "Only integral types are offsetable",
-       "offsetable<> only permitted within models"},
+      {"xvector<movable<cref<K>>>", "", "movable<> only permitted within models"},
+      {"xvector<movable<int8>>", "movable<T> only permitted where T is a pref/cref",
+       "movable<> only permitted within models"},
+      {"xvector<xmap<int8,movable<pref<n::I>>>>", "movable<> not permitted here",
+       "movable<> only permitted within models"},
+      {"offsettable<int8>", "", "offsetable<> only permitted within models"},
+      {"offsettable<bool>", "Only integral types are offsetable", "offsetable<> only permitted within models"},
       {"xvector<offsettable<int8>>", "offsetable<> not permitted here - data type is immutable",
-       "offsetable<> not permitted here - data type is immutable", "offsetable<> only permitted within models"},
-      {"pref<K>", "pref<T> requires that T be an interface", "pref<T> requires that T be an interface",
-       "pref<T> requires that T be an interface"},
-      {"ptr<E>", "ptr<T> requires that T be an interface", "ptr<T> doesn't support serialisation",
-       "ptr<T> requires that T be an interface"},
-      {"cref<n::I>", "cref<T> requires that T be a class/struct/model",
-       "cref<T> requires that T be a class/struct/model", "cref<T> requires that T be a class/struct/model"},
-      {"void", "void not permitted here", "void not permitted here", "void not permitted here"},
-      {"void*", "", "Pointers don't support serialisation", ""},
-      {"xvector<n::I>", "Interface specfifer must appear in pref<> or ptr<>",
-       "Interface specfifer must appear in pref<> or ptr<>", "Interface specfifer must appear in pref<> or ptr<>"},
-      {"F", "functor not permitted within models", "functor not permitted within models", ""},
-      {"K&", "References not permitted within models", "References not permitted within models", ""},
-      {"ptr<n::I>", "", "ptr<T> doesn't support serialisation", ""},
-      {"xdeque<int8>", "deque<T> currently not supported", "deque<T> currently not supported",
-       "deque<T> currently not supported"},
-      {"xlist<int8>", "list<T> currently not supported", "list<T> currently not supported",
-       "list<T> currently not supported"},
-      {"int8 x[2][]", "", "", ""},
-      {"xbag<int8>", "bag<T> currently not supported", "bag<T> currently not supported",
-       "bag<T> currently not supported"},
+       "offsetable<> only permitted within models"},
       {"xmap<assignable<int8>,int8>", "assignable<> not permitted here - data type is immutable",
-       "assignable<> not permitted here - data type is immutable", "assignable<> only permitted within models"},
-      {"xmap<int8,assignable<int8>>", "", "", "assignable<> only permitted within models"},
+       "assignable<> only permitted within models"},
+      {"xmap<int8,assignable<int8>>", "", "assignable<> only permitted within models"},
+      {"ptr<n::I>", "", ""},
+      {"void*", "", ""},
+      {"F", "functor not permitted within models", ""},
+      {"K&", "References not permitted within models", ""},
+      {"int8 x[2][]", "", ""},
   };
-  for (const Case& c : cases) {
-    EXPECT_EQ(c.inModel, fault(c.text, true, false)) << c.text;
-    EXPECT_EQ(c.serialisable, fault(c.text, true, true)) << c.text;
-    EXPECT_EQ(c.plain, fault(c.text, false, false)) << c.text;
+  for (const auto& [text, inModel, outside] : cases) {
+    EXPECT_EQ(inModel, fault(text, true, false)) << text;
+    EXPECT_EQ(outside, fault(text, false, false)) << text;
   }
-  EXPECT_EQ("const or volatile qualifiers not permitted on serialisable types", fault("const int8", false, true));
-  EXPECT_EQ("functor doesn't support serialisation", fault("F", false, true));
-  EXPECT_EQ("References don't support serialisation", fault("K&", false, true));
+  const std::pair<std::string, std::string> everywhere[] = {
+      {"pref<K>", "pref<T> requires that T be an interface"},
+      {"ptr<E>", "ptr<T> requires that T be an interface"},
+      {"cref<n::I>", "cref<T> requires that T be a class/struct/model"},
+      {"void", "void not permitted here"},
+      {"xvector<n::I>", "Interface specfifer must appear in pref<> or ptr<>"},
+      {"xdeque<int8>", "deque<T> currently not supported"},
+      {"xlist<int8>", "list<T> currently not supported"},
+      {"xbag<int8>", "bag<T> currently not supported"},
+  };
+  for (const auto& [text, message] : everywhere) {
+    EXPECT_EQ(message, fault(text, true, false));
+    EXPECT_EQ(message, fault(text, false, false));
+  }
+  const std::pair<std::string, std::string> serialised[] = {
+      {"K", ""},
+      {"const int8", "const or volatile qualifiers not permitted on serialisable types"},
+      {"F", "functor doesn't support serialisation"},
+      {"void*", "Pointers don't support serialisation"},
+      {"K&", "References don't support serialisation"},
+      {"ptr<E>", "ptr<T> doesn't support serialisation"},
+  };
+  for (const auto& [text, message] : serialised) EXPECT_EQ(message, fault(text, false, true));
 }
 
 }  // namespace
