@@ -80,9 +80,9 @@ inline std::map<xstring, TypeOps const*>& TypeOpsTable() {
   return table;
 }
 
-inline NSE RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops) {
+inline bool RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops) {
   TypeOpsTable().insert({type.m_text, ops});
-  return NSE_OK;
+  return true;
 }
 
 // Null when nobody registered the type. Decorators, metadata and typedefs are looked through.

@@ -17,8 +17,7 @@ void PrintClass(vesk::ReflectedClass const& record)
     for (vesk::ssize_t i = 0; i < record.m_numFields; ++i)
     {
         vesk::ReflectedField const& field = record.m_fields[i];
-        xout() << "    " << vesk::TypeText({field.m_type, record.m_strings}) << ' ' << field.m_name << " at "
-               << field.m_offset << '\n';
+        xout() << "    " << vesk::TypeText({field.m_type, record.m_strings}) << ' ' << field.m_name << '\n';
     }
     for (vesk::ssize_t i = 0; i < record.m_numMethods; ++i)
     {

@@ -5,7 +5,7 @@
 namespace geo
 {
 
-$struct+ Point <<os compare>> : [ "in the plane" ]
+$struct+ Point <<compare os ar>> : [ "in the plane" ]
 {
     $float64 x : [ unit("mm") ];
     $float64 y : [ unit("mm") ];
@@ -15,11 +15,14 @@ $struct+ Point <<os compare>> : [ "in the plane" ]
     $float64 DistanceTo(const Point& other) const;
 
     void Write(vesk::xostream& os) const { os << '(' << x << ',' << y << ')'; }
+    void Serialise(vesk::Archive& ar) const { ar << x << y; }
+    void Deserialise(vesk::InputArchive& ar) { ar >> x >> y; }
     bool operator==(const $$ & p) const { return x == p.x && y == p.y; }
     bool operator<(const $$ & p) const { return x != p.x ? x < p.x : y < p.y; }
 };
 
 // A template gets a record for each of its instances.
+$warning(disable: 1009)
 $struct Pair<typename T, typename U> <<reflect>>
 {
     T first{};

@@ -34,10 +34,11 @@ public:
 };
 
 // A drawing keeps its shapes in layers, which are no one else's business.
+$warning(disable: 1009)
 $class+ Drawing isa vesk::IObject
 {
 public:
-    $void Draw(ptr<IShape> shape, const string8& layer);
+    $void Draw(vesk::ptr<IShape> shape, const vesk::string8& layer);
     $float64 Area() const;
     $string8 title;
 
