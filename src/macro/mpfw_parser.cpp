@@ -114,12 +114,21 @@ bool MpfwParser::ParseImportStatement() {
   std::string path, found;
   ReadString(path);
   if (!ResolveImport(path, found)) throw LexScannerException("Couldn't open file " + path, previous);
-  const auto& files = context.sourceFiles;
-  auto file = std::find_if(files.begin(), files.end(),
-                           [&](const auto& candidate) { return EqualIgnoringCase(candidate->path, found); });
-  if (file != files.end()) OnImportedFile(**file);
+  if (MpfwSourceFile* file = FindLoaded(found)) OnImportedFile(*file);
   Advance();
   return true;
+}
+
+// A file that several texts import was loaded, and expanded, for each of them; the one wanted here follows its
+// importer.
+MpfwSourceFile* MpfwParser::FindLoaded(const std::string& path) const {
+  const auto& files = context.sourceFiles;
+  auto importer = std::find_if(files.begin(), files.end(), [&](const auto& file) {
+    return TextRange(std::string_view(file->expansion)).Contains(current.text.begin);
+  });
+  auto file = std::find_if(importer == files.end() ? files.begin() : importer + 1, files.end(),
+                           [&](const auto& candidate) { return EqualIgnoringCase(candidate->path, path); });
+  return file == files.end() ? nullptr : file->get();
 }
 
 bool MpfwParser::ParseVariableStatement(std::string* name, std::string* value) {

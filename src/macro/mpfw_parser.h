@@ -66,6 +66,8 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   MpfwContext& context;
 
  private:
+  MpfwSourceFile* FindLoaded(const std::string& path) const;  // or null
+
   static constexpr int kMaxImportDepth = 200;  // a file may import itself
   int m_importDepth = 0;
 };
