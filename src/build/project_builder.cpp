@@ -78,7 +78,7 @@ bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile*
       ReportUnregistered();
       if (!settings.translateOnly && result) result = LinkIfStale();
     }
-  } catch (const LexScannerException&) {
+  } catch (const IException&) {
     Save(dependencyFile);
     throw;
   }

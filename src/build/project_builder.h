@@ -19,7 +19,7 @@ class ProjectBuilder : public TranslationHost {
   ~ProjectBuilder() override;
 
   // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
-  // A LexScannerException of the translation goes on to the caller; what was finished before it is kept.
+  // An exception of the translation goes on to the caller; what was finished before it is kept.
   bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
   void Clean(const std::string& dependencyFile);
 

@@ -95,7 +95,7 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
   CopyIfNewer(fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
   const size_t slash = entry.rfind('/');
   m_workspace.relativeDir = slash == std::string::npos ? std::string() : entry.substr(0, slash);
-  WorkspaceParser parser(m_workspace);
+  WorkspaceParser parser(m_workspace, fullPath);
   MpfwSourceFile* file = parser.LoadSourceFile(fullPath);
   if (!file) {
     TraceWriter() << "Error in workspace file " << fullPath << "\n";
@@ -225,23 +225,32 @@ ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
   return config;
 }
 
+// What ends a build early is reported here, and ends the run.
+template <typename Work>
+bool Guarded(Work work) {
+  try {
+    work();
+    return true;
+  } catch (const LexScannerException& exception) {
+    TraceWriter() << "\n" << exception << "\n";
+  } catch (const IException& exception) {
+    TraceWriter() << "Error: " << exception << "\n";
+  }
+  return false;
+}
+
 bool WorkspaceRun::BuildProject(Project& project) {
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
-  try {
+  return Guarded([&] {
     ProjectBuilder builder(m_settings, project, *config);
     ScopeTimer timer;
     const std::string dependencyFile = DependencyFilePath(project, *config);
     bool succeeded = true;
-    try {
-      if (m_settings.mode == RunMode::Clean) {
-        builder.Clean(dependencyFile);
-      } else {
-        succeeded = builder.Build(dependencyFile, nullptr);
-      }
-    } catch (const LexScannerException& exception) {
-      TraceWriter() << "\n" << exception << "\n";
-      return false;
+    if (m_settings.mode == RunMode::Clean) {
+      builder.Clean(dependencyFile);
+    } else {
+      succeeded = builder.Build(dependencyFile, nullptr);
     }
     m_errors += builder.errorCount;
     m_warnings += builder.warningCount;
@@ -249,11 +258,7 @@ bool WorkspaceRun::BuildProject(Project& project) {
       timer.Stop();
       timer.Label() << project.name;
     }
-    return true;
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
-    return false;
-  }
+  });
 }
 
 void WorkspaceRun::GenerateWorkspace() {
@@ -295,12 +300,7 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   if (!config) return false;
   ProjectBuilder builder(m_settings, project, *config);
   DeleteReporting(builder.TranslatedPath(*file));
-  try {
-    builder.Build(DependencyFilePath(project, *config), file);
-  } catch (const LexScannerException& exception) {
-    TraceWriter() << "\n" << exception << "\n";
-    return false;
-  }
+  if (!Guarded([&] { builder.Build(DependencyFilePath(project, *config), file); })) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Compile completed";

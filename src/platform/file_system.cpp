@@ -141,6 +141,15 @@ bool SetReadOnlyAttribute(const std::string& path, bool readOnly) {
   return chmod(path.c_str(), readOnly ? status.st_mode & ~kWriteBits : status.st_mode | S_IWUSR) == 0;
 }
 
+bool CopyExecuteBits(const std::string& from, const std::string& to) {
+  constexpr mode_t kExecuteBits = S_IXUSR | S_IXGRP | S_IXOTH;
+  SetLastError(0);
+  struct stat source, target;
+  if (stat(from.c_str(), &source) != 0 || stat(to.c_str(), &target) != 0) return false;
+  const mode_t bits = source.st_mode & kExecuteBits;
+  return bits == 0 || chmod(to.c_str(), (target.st_mode | bits) & 07777) == 0;
+}
+
 bool StampNow(const std::string& path) {
   SetLastError(0);
   return utimensat(AT_FDCWD, path.c_str(), nullptr, 0) == 0;
@@ -154,6 +163,12 @@ bool FullPath(const std::string& path, std::string& out) {
   if (out.size() > 2 && out.compare(out.size() - 2, 2, "/.") == 0) out.resize(out.size() - 2);
   if (out.size() > 1 && out.back() == '/') out.pop_back();
   return true;
+}
+
+bool RealPath(const std::string& path, std::string& out) {
+  boost::system::error_code error;
+  out = boost::filesystem::canonical(path, error).generic_string();
+  return !error;
 }
 
 std::vector<std::string> EntryNames(const std::string& directory) {

@@ -33,7 +33,9 @@ bool RenameFile(const std::string& from, const std::string& to);
 bool MakeDirectory(const std::string& path);
 bool SetReadOnlyAttribute(const std::string& path, bool readOnly);
 bool StampNow(const std::string& path);
+bool CopyExecuteBits(const std::string& from, const std::string& to);
 bool FullPath(const std::string& path, std::string& out);
+bool RealPath(const std::string& path, std::string& out);           // with symbolic links resolved
 std::vector<std::string> EntryNames(const std::string& directory);  // "." and ".." included, in byte order
 
 }  // namespace qrex::platform

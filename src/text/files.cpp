@@ -54,7 +54,7 @@ bool CopyFile(const std::string& from, const std::string& to, bool failIfExists)
     platform::SetLastError(exception.errorCode);
     return false;
   }
-  return true;
+  return platform::CopyExecuteBits(from, to);
 }
 
 bool CreateEmptyFile(const std::string& path, bool keepExisting) {
@@ -93,6 +93,7 @@ bool TouchFile(const std::string& path, bool create) {
 }
 
 bool FullPathOf(const std::string& path, std::string& out) { return platform::FullPath(Checked(path), out); }
+bool RealPathOf(const std::string& path, std::string& out) { return platform::RealPath(Checked(path), out); }
 bool ReadWholeFile(std::string& out, const std::string& path) { return platform::ReadFile(Checked(path), out); }
 
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds) {

@@ -15,13 +15,14 @@ namespace qrex {
 
 bool FileExists(const std::string& path);  // false for a directory and for a file that cannot be opened for reading
 bool DeleteFile(const std::string& path);
-bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);
+bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);  // a program stays executable
 bool CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 bool SetReadOnly(const std::string& path, bool readOnly);
 int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a directory and a missing file
 bool TouchFile(const std::string& path, bool create);
 bool FullPathOf(const std::string& path, std::string& out);
+bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
 bool ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
 

@@ -148,22 +148,30 @@ void ScannedFile::WriteGeneratedFile() {
     WriteTranslation(target);
   } else if (needsWriting) {
     needsWriting = false;
-    CopySource(target);
-    translationTime = CurrentFileTime();
+    const int64_t readTime = CurrentFileTime();
+    if (CopySource(target)) translationTime = readTime;
   }
 }
 
+// The time of the translation is that of the reading: what is edited while it runs is stale in the next run.
 void ScannedFile::WriteTranslation(const std::string& target) {
+  const int64_t readTime = CurrentFileTime();
   if (!LoadText(sourceText, SourcePath(), true)) {
     throw LexScannerException("Couldn't open file " + SourcePath(), nullptr);
   }
   registerNames.clear();
   unregisterNames.clear();
   typeRegistrations.clear();
+  const std::vector<ScannedFile*> knownImports = std::move(imports);
   imports.clear();
   importClosure = {};
   BufferStream generated;
-  TranslateFile(*this, generated);
+  try {
+    TranslateFile(*this, generated);
+  } catch (...) {
+    imports = knownImports;  // a part of them would hide from the next run what makes this file stale
+    throw;
+  }
 
   if (!needsWriting) return;
   const ConfigSettings& settings = host.Settings();
@@ -177,18 +185,19 @@ void ScannedFile::WriteTranslation(const std::string& target) {
   }
   needsWriting = false;
   latestTargetTime = 0;
-  translationTime = CurrentFileTime();
+  translationTime = readTime;
 }
 
-void ScannedFile::CopySource(const std::string& target) const {
+bool ScannedFile::CopySource(const std::string& target) const {
   ChangeReadOnly(target, false);
   CreateDirectories(target, false);
   if (!CopyFile(SourcePath(), target, false)) {
     TraceWriter() << "ERROR: Copy file " << SourcePath() << " to " << target << " failed\n";
-    return;
+    return false;
   }
   TouchFile(target, false);
   if (host.Settings().makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+  return true;
 }
 
 bool ScannedFile::MapGeneratedLine(int64_t generatedLine, std::string& path, int64_t& line) const {

@@ -90,7 +90,7 @@ class ScannedFile : public ImportHandler {
 
  private:
   void WriteTranslation(const std::string& target);
-  void CopySource(const std::string& target) const;
+  bool CopySource(const std::string& target) const;  // false, with a message, when it failed
 };
 
 }  // namespace qrex

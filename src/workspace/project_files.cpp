@@ -13,7 +13,7 @@ namespace qrex {
 
 namespace {
 
-constexpr int kMaxNesting = 1000;
+constexpr size_t kMaxNesting = 1000;
 
 bool HoldsWildcard(const LexToken& token) {
   return token.kind == kDoubleQuoted && token.text.View().find_first_of("*?") != std::string_view::npos;
@@ -106,7 +106,11 @@ void ProjectParser::ParseSearch(ProjectFolder& folder, const std::string& direct
 }
 
 void ProjectParser::Find(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory) {
-  if (++search.depth > kMaxNesting) throw LexScannerException("Directories nested too deeply", current);
+  std::string realPath;
+  if (!RealPathOf(PathJoin(root, directory), realPath)) return;
+  if (std::find(search.open.begin(), search.open.end(), realPath) != search.open.end()) return;  // a link to itself
+  if (search.open.size() >= kMaxNesting) throw LexScannerException("Directories nested too deeply", current);
+  search.open.push_back(realPath);
   std::vector<std::string> names;
   FileOrDirIterator entries(PathJoin(root, directory) + "/*");
   while (const IFileOrDirInfo* entry = entries.Next()) {
@@ -121,7 +125,7 @@ void ProjectParser::Find(Search& search, const std::string& root, ProjectFolder&
   for (const std::string& name : names) {
     search.matched.push_back(&AddFile(folder, PathJoin(directory, name), name));
   }
-  --search.depth;
+  search.open.pop_back();
 }
 
 void ProjectParser::FindInSubdirectory(Search& search, const std::string& root, ProjectFolder& folder,
@@ -130,9 +134,8 @@ void ProjectParser::FindInSubdirectory(Search& search, const std::string& root, 
   if (search.flat) return Find(search, root, folder, subdirectory);
   bool isNew = false;
   ProjectFolder& subfolder = FolderNamed(folder, name, &isNew);
-  const size_t matchedBefore = search.matched.size();
   Find(search, root, subfolder, subdirectory);
-  if (isNew && search.matched.size() == matchedBefore) folder.subfolders.pop_back();
+  if (isNew && subfolder.files.empty() && subfolder.subfolders.empty()) folder.subfolders.pop_back();
 }
 
 // --- Names

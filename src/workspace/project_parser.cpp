@@ -68,10 +68,8 @@ void ProjectParser::ParseHeads() {
   const std::string& directory = m_project.rootToProjDir;
   m_project.sourceDir = PathJoin(directory, "src");
   if (current.kind == kDollar) {
-    LexScanner ahead = scanner;
-    if (NextToken(ahead).Is("PROJDIR_TO_ROOT")) ReadHead("PROJDIR_TO_ROOT", m_project.projDirToRoot);
-  }
-  if (m_project.projDirToRoot.empty()) {
+    ReadHead("PROJDIR_TO_ROOT", m_project.projDirToRoot);
+  } else {
     m_project.projDirToRoot = "..";
     for (auto count = std::count(directory.begin(), directory.end(), '/'); count > 0; --count) {
       m_project.projDirToRoot += "/..";

@@ -65,7 +65,7 @@ class ProjectParser : public MpfwParser {
     bool recurse = false;
     bool flat = false;
     Files matched;
-    int depth = 0;
+    std::vector<std::string> open;  // the directories under search, outermost first, without links
   };
   void Find(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory);
   void FindInSubdirectory(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory,
@@ -78,7 +78,7 @@ class ProjectParser : public MpfwParser {
 
   Project& m_project;
   FileFilter& m_directoryFilter;
-  int m_depth = 0;
+  size_t m_depth = 0;
 };
 
 }  // namespace qrex

@@ -156,7 +156,11 @@ void Workspace::SyncProjectGuids() {
   GuidMap guids;
   std::string bytes;
   try {
-    if (ReadWholeFile(bytes, kGuidFile)) guids = ParseGuids(bytes);
+    if (ReadWholeFile(bytes, kGuidFile)) {
+      guids = ParseGuids(bytes);
+    } else if (const FileException failure(kGuidFile); LastWriteTime(kGuidFile) != 0) {
+      throw failure;  // it is there, but can't be read
+    }
     for (const auto& project : projects) {
       auto found = guids.find(project->name);
       if (found != guids.end()) project->guid = found->second;

@@ -55,8 +55,11 @@ void WorkspaceParser::ParseNested(const std::string& path) {
   const bool exists = FindInTree(m_workspace.settings, path, root, fullPath);
   if (!exists) throw LexScannerException("Couldn't open workspace file " + path, previous);
   CopyIfNewer(fullPath, m_workspace.settings.exportUntranslatedInclude + "/" + path, true);
+  for (const WorkspaceParser* open = this; open; open = open->m_outer) {
+    if (open->m_path == fullPath) throw LexScannerException("Workspace file includes itself : " + path, previous);
+  }
   if (m_depth >= kMaxNesting) throw LexScannerException("Workspace files nested too deeply", previous);
-  WorkspaceParser nested(m_workspace);
+  WorkspaceParser nested(m_workspace, fullPath, this);
   nested.m_depth = m_depth + 50;  // each nested file stands for the stack of many blocks
   MpfwSourceFile* file = LoadSourceFile(fullPath);
   if (!file) throw LexScannerException("Error in workspace file " + fullPath, previous);

@@ -10,7 +10,9 @@ namespace qrex {
 
 class WorkspaceParser : public MpfwParser {
  public:
-  explicit WorkspaceParser(Workspace& workspace) : MpfwParser(workspace.context), m_workspace(workspace) {}
+  // `path`: of the file; `outer`: the parser of the file that names it, or null.
+  explicit WorkspaceParser(Workspace& workspace, std::string path, const WorkspaceParser* outer = nullptr)
+      : MpfwParser(workspace.context), m_workspace(workspace), m_path(std::move(path)), m_outer(outer) {}
 
   bool ResolveImport(const std::string& path, std::string& found) override;
   void OnImportedFile(MpfwSourceFile&) override {}  // brings macros and variables, no projects
@@ -24,6 +26,8 @@ class WorkspaceParser : public MpfwParser {
   void ParseProject(const std::string& path, Project* parent);
 
   Workspace& m_workspace;
+  const std::string m_path;
+  const WorkspaceParser* const m_outer;
   int m_depth = 0;
 };
 
