@@ -1,0 +1,246 @@
+// The configuration file: what statements do to the settings, the messages, and what a mode demands.
+
+#include "driver/config_parser.h"
+#include "driver/run_workspace.h"
+#include "workspace/workspace_fixture.h"
+
+namespace qrex {
+namespace {
+
+std::string Joined(const std::vector<std::string>& entries) {
+  std::string text;
+  for (const std::string& entry : entries) text += "[" + entry + "]";
+  return text;
+}
+
+class ConfigTest : public WorkspaceTest {
+ protected:
+  ConfigTest() { Reset(); }
+
+  void Reset() {
+    m_settings = std::make_unique<ConfigSettings>();
+    trace.clear();
+  }
+  void Load(const std::string& text, const std::string& extraText = {}) {
+    Reset();
+    Write("main.qrex", text);
+    EXPECT_TRUE(LoadConfiguration(*m_settings, "main.qrex", extraText)) << trace;
+  }
+  void AssertFails(const std::string& text, const std::string& expected) {
+    Reset();
+    Write("main.qrex", text);
+    EXPECT_FALSE(LoadConfiguration(*m_settings, "main.qrex", "")) << text;
+    EXPECT_EQ(expected, trace) << text;
+  }
+  ConfigSettings& Got() { return *m_settings; }
+
+ private:
+  std::unique_ptr<ConfigSettings> m_settings;
+};
+
+TEST_F(ConfigTest, Defaults) {
+  Load("");
+  EXPECT_EQ(RunMode::Build, Got().mode);
+  EXPECT_EQ(CompilerKind::vc8, Got().compiler);
+  EXPECT_TRUE(Got().defaultToDll && Got().writeTokenEquivalent && Got().exportPublicHeaders);
+  EXPECT_TRUE(Got().repackageExecutableTargets && Got().solutionContainsPrepackagedProjects);
+  EXPECT_TRUE(Got().makeTranslatedFilesReadOnly && Got().makeExportedHeaderFilesReadOnly);
+  EXPECT_FALSE(Got().diagnostics || Got().targetXP || Got().translateOnly || Got().rebuildAll);
+}
+
+TEST_F(ConfigTest, Keys) {
+  Load(
+      "virtualTree = { \"a\" ('b' + \"c\") } virtualTree += { 'd' }\n"
+      "workspaces = { \"old\" } workspaces = { } workspaces += { \"w\" }\n"
+      "config = \"Old\" config=\"New\" platform = ('P') systemName = \"N\" systemProcessor = \"R\"\n"
+      "systemVersion = \"V\" sizeofPointer = \"8\"\n"
+      "compiler = winegcc mode = show\n"
+      "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true\n"
+      "exportPublicHeaders = false repackageExecutableTargets = false solutionContainsPrepackagedProjects = false\n"
+      "makeTranslatedFilesReadOnly = false makeExportedHeaderFilesReadOnly = false writeTokenEquivalent = false",
+      "\nmode=clean\n");
+  EXPECT_EQ("[a][bc][d]", Joined(Got().virtualTree));
+  EXPECT_EQ("[w]", Joined(Got().workspaces));
+  EXPECT_EQ("New P N R V 8", Got().config + " " + Got().platform + " " + Got().systemName + " " +
+                                 Got().systemProcessor + " " + Got().systemVersion + " " + Got().sizeofPointer);
+  EXPECT_EQ(CompilerKind::winegcc, Got().compiler);
+  EXPECT_EQ(RunMode::Clean, Got().mode);  // a line of the command line comes last
+  EXPECT_TRUE(Got().targetXP && Got().diagnostics && Got().translateOnly && Got().rebuildAll);
+  EXPECT_FALSE(Got().defaultToDll || Got().exportPublicHeaders || Got().repackageExecutableTargets);
+  EXPECT_FALSE(Got().solutionContainsPrepackagedProjects || Got().makeTranslatedFilesReadOnly);
+  EXPECT_FALSE(Got().makeExportedHeaderFilesReadOnly || Got().writeTokenEquivalent);
+}
+
+TEST_F(ConfigTest, CompilerWords) {
+  for (const char* word : {"vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"}) {
+    Load(std::string("compiler = ") + word);
+    EXPECT_EQ(word, CompilerKeyword(Got().compiler));
+  }
+}
+
+TEST_F(ConfigTest, Variables) {
+  Load(
+      "$A = \"x\\\\y/\" $B = path \"x\\\\y/\" $C = \"$(A)!\"\n"
+      "$EXPORT_LIB = \"lib\" $EXPORT_TRANSLATED_INCLUDE = \"t\" $EXPORT_UNTRANSLATED_INCLUDE = path \"u\\\\\"\n"
+      "$COMPILE_FILE_PATH = \"c\\\\w/x.cpp\"");
+  EXPECT_EQ(
+      "$A = x\\y/\n$B = x/y\n$C = x\\y/!\n$EXPORT_LIB = lib\n$EXPORT_TRANSLATED_INCLUDE = t\n"
+      "$EXPORT_UNTRANSLATED_INCLUDE = u\n$COMPILE_FILE_PATH = c\\w/x.cpp\n",
+      trace);
+  EXPECT_EQ("lib t u c/w/x.cpp", Got().exportLib + " " + Got().exportTranslatedInclude + " " +
+                                     Got().exportUntranslatedInclude + " " + Got().compileFilePath);
+}
+
+TEST_F(ConfigTest, TargetDirectory) {
+  const struct {
+    const char *value, *platform, *config;
+  } kRows[] = {
+      {"\"build/x64/Release\"", "x64", "Release"},
+      {"path \"a/b/Win32/Debug/\"", "Win32", "Debug"},
+      {"\"a\\\\b\\\\c\"", "b", "c"},
+      {"\"/x/y\"", "x", "y"},
+      {"\"x\"", "p", "c"},
+      {"\"x/y\"", "p", "c"},
+      {"\"/y\"", "p", "c"},
+      {"\"\"", "p", "c"},
+  };
+  for (const auto& row : kRows) {
+    Load(std::string("platform = \"p\" config = \"c\" $TARGET_DIR = ") + row.value);
+    EXPECT_EQ(std::string(row.platform) + "|" + row.config, Got().platform + "|" + Got().config) << row.value;
+  }
+}
+
+TEST_F(ConfigTest, Environments) {
+  Load(
+      "PATH(\"W\") = { \"a\" \"b\" } PATH(\"W\") += { \"c\" } INCLUDE(\"W\") += { \"\" \"i\" } LIB(\"W\") = { \"l\" }\n"
+      "LIB(\"W\") = { } PATH(\"V\") = { }");
+  const PlatformEnvironment& environment = Got().platformEnvironments.at("W");
+  EXPECT_EQ("a;b;c|i|", environment.PATH + "|" + environment.INCLUDE + "|" + environment.LIB);
+  EXPECT_EQ(2u, Got().platformEnvironments.size());
+  EXPECT_EQ(nullptr, Got().Environment());
+  Got().platform = "W";
+  EXPECT_EQ(&environment, Got().Environment());
+}
+
+TEST_F(ConfigTest, Messages) {
+  for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
+           {"\nmode clean", "(2) : Expected = after mode when read clean"},
+           {"mode = Clean", "(1) : Invalid option : Clean"},
+           {"compiler =", "(1) : Invalid option : EOS"},
+           {"\n\nmoed = clean", "(3) : Syntax error: moed"},
+           {"translateOnly = yes", "(1) : Expected false/true after = when read yes"},
+           {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},
+           {"PATH('a') = { }", "(1) : Expected double quoted string after ( when read 'a'"},
+           {"PATH = { }", "(1) : Expected ( after PATH when read ="},
+           {"LIB(\"a\") { }", "(1) : Expected = after ) when read {"},
+           {"INCLUDE(\"a\") += \"b\"", "(1) : Expected { after += when read \"b\""},
+           {"virtualTree = { \"a\"", "(1) : Expected quoted string when read EOS"},
+           {"config = Debug", "(1) : Expected quoted string when read Debug"},
+           {"config = (\"a\"", "(1) : Expected ) after \"a\" when read EOS"},
+           {"$\"a\" = \"b\"", "(1) : Expected identifier after $ when read \"a\""},
+           {"$a \"b\"", "(1) : Expected = after a when read \"b\""},
+           {"}", "(1) : Syntax error: }"},
+       }) {
+    AssertFails(text, std::string("\nmain.qrex") + message + "\n");
+  }
+  AssertFails("@import \"none\"",
+              "\nmain.qrex(1) : Couldn't open file none\n    while processing qrex config file : main.qrex\n");
+  EXPECT_FALSE(LoadConfiguration(Got(), "none.qrex", ""));
+  EXPECT_FALSE(LoadConfiguration(Got(), ".", ""));
+  EXPECT_EQ("Exception: Couldn't open file none.qrex\nException: Couldn't open file .\n",
+            trace.substr(trace.find("Exception")));
+}
+
+TEST_F(ConfigTest, Imports) {
+  Write("inc/one", "@def m = x\nconfig = \"one\"\n@import \"two\"");
+  Write("inc/two", "platform = \"two\" config = \"_m_\"");
+  Load("config = \"main\"\n@importpath \"inc\"\n@import \"one\"\nmode = gen");
+  EXPECT_EQ("two|_m_", Got().platform + "|" + Got().config);
+  EXPECT_EQ(RunMode::Gen, Got().mode);
+  Write("bad", "\nmode = bad");
+  AssertFails("\n\n@import \"bad\"",
+              "\nbad(2) : Invalid option : bad\n\nmain.qrex(3) : while processing @import of bad\n");
+}
+
+TEST_F(ConfigTest, SearchOfImports) {
+  Write("p/x", "");
+  Write("tree/x", "");
+  Write("tree/y", "");
+  Write("more/y", "");
+  settings.context.importPaths = {"none", "p"};
+  std::string found, root;
+  EXPECT_TRUE(FindImport(settings, "x", found));
+  EXPECT_EQ("p/x", found);
+  EXPECT_TRUE(FindImport(settings, "y", found));
+  EXPECT_EQ("tree/y", found);
+  EXPECT_TRUE(FindImport(settings, "more/y", found));
+  EXPECT_EQ("more/y", found);
+  EXPECT_FALSE(FindImport(settings, "z", found) || FindImport(settings, "tree", found));
+  std::filesystem::remove("tree/y");
+  EXPECT_TRUE(FindInTree(settings, "y", root, found));
+  EXPECT_EQ("more|more/y", root + "|" + found);
+}
+
+TEST_F(ConfigTest, Validation) {
+  const std::string missing = "\nERROR:  Missing setting: ";
+  const struct {
+    std::string addition, message;
+  } kSteps[] = {
+      {"", missing + "'virtualTree' not specified\n"},
+      {"virtualTree = { \"t\" }", missing + "$EXPORT_LIB not specified\n"},
+      {"$EXPORT_LIB = \"l\"", missing + "$EXPORT_TRANSLATED_INCLUDE not specified\n"},
+      {"$EXPORT_TRANSLATED_INCLUDE = \"i\"", missing + "$EXPORT_UNTRANSLATED_INCLUDE not specified\n"},
+      {"$EXPORT_UNTRANSLATED_INCLUDE = \"i\"",
+       "\nERROR:  $EXPORT_TRANSLATED_INCLUDE and $EXPORT_UNTRANSLATED_INCLUDE both equal i\n"},
+      {"$EXPORT_UNTRANSLATED_INCLUDE = \"u\"", missing + "'workspace' not specified\n"},
+      {"workspaces = { \"w\" }", missing + "'config' not specified\n"},
+      {"mode = gen", ""},
+      {"mode = build config = \"c\"", missing + "'platform' not specified\n"},
+      {"platform = \"p\"", "\nERROR:  PATH, INCLUDE, LIB not set for platform p\n"},
+      {"mode = clean", ""},
+      {"mode = show", ""},
+      {"mode = build translateOnly = true", ""},
+      {"mode = compile", "\nERROR:  PATH, INCLUDE, LIB not set for platform p\n"},
+      {"LIB(\"p\") = { \"l\" }", "\nERROR:  PATH not specified for platform p\n"},
+      {"PATH(\"p\") = { \"l\" }", "\nERROR:  INCLUDE not specified for platform p\n"},
+      {"INCLUDE(\"p\") = { \"l\" } LIB(\"p\") = { }", "\nERROR:  LIB not specified for platform p\n"},
+      {"LIB(\"p\") = { \"l\" }", missing + "'COMPILE_FILE_PATH' not specified\n"},
+      {"$COMPILE_FILE_PATH = \"x.cpp\"", ""},
+  };
+  std::string text;
+  for (const auto& step : kSteps) {
+    text += step.addition + "\n";
+    Load(text);
+    EXPECT_EQ(step.message, ValidateSettings(Got())) << step.addition;
+  }
+}
+
+TEST_F(ConfigTest, PathSyntax) {
+  EXPECT_TRUE(CheckPathSyntax(settings));
+  settings.workspaces = {"w", "a/", "b\\"};
+  EXPECT_FALSE(CheckPathSyntax(settings));
+  settings.exportUntranslatedInclude = "u\\";
+  EXPECT_FALSE(CheckPathSyntax(settings));
+  settings.virtualTree = {"t\\/"};
+  EXPECT_FALSE(CheckPathSyntax(settings));
+  EXPECT_EQ(
+      "Path can't end with a trailing slash in argument a/\nForward slashes must be used in argument u\\\n"
+      "Forward slashes must be used in argument t\\/\n",
+      trace);
+}
+
+TEST_F(ConfigTest, WorkspaceRoot) {
+  Write("w/.qrwsroot", "");
+  Write("w/sub/.qrwsroot", "");
+  std::string root, relative;
+  EXPECT_TRUE(FindWorkspaceRoot("w/sub/a/x.cpp", root, relative));
+  EXPECT_EQ("w/sub|a/x.cpp", root + "|" + relative);
+  EXPECT_TRUE(FindWorkspaceRoot("w/x.cpp", root, relative));
+  EXPECT_EQ("w|x.cpp", root + "|" + relative);
+  for (const char* path : {"x.cpp", "none/x.cpp", "/x.cpp", "w\\x.cpp", ""}) {
+    EXPECT_FALSE(FindWorkspaceRoot(path, root, relative)) << path;
+  }
+}
+
+}  // namespace
+}  // namespace qrex

@@ -1,0 +1,597 @@
+#!/usr/bin/env python3
+"""Whole runs: modes, what a second run leaves alone, bad input, faults of the disk, and runs that are killed.
+
+Usage: run_test.py BINARY [TEST...]. Each test is a function that works in a folder of its own."""
+
+import functools
+import os
+import re
+import resource
+import shutil
+import stat
+import struct
+import subprocess
+import sys
+import tempfile
+import time
+import zlib
+
+from workspace_fixture import Skipped, holds, lacks, need, run_tests
+
+BINARY = os.path.abspath(sys.argv[1])
+CONFIG = '''virtualTree = { "tree" }
+$EXPORT_LIB = "out/lib"
+$EXPORT_TRANSLATED_INCLUDE = "out/tinc"
+$EXPORT_UNTRANSLATED_INCLUDE = "out/uinc"
+workspaces = { "ws/all.qrws" }
+config = "Debug"
+platform = "x64"
+translateOnly = true
+compiler = gcc
+PATH("x64") = { "/usr/bin" "/bin" }
+INCLUDE("x64") = { "inc" }
+LIB("x64") = { "lib" }
+'''
+HEAD = '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "app"\n'
+PROJECT = HEAD + 'config { "Debug|x64" }\nqrex\n'
+FILES = {
+    'main.qrex': CONFIG,
+    'tree/.qrwsroot': '',
+    'tree/ws/all.qrws': '"all" { "app" }\n',
+    'tree/app/src/app.qrpj': PROJECT + '{ "a.h" "b.h" "c.h" "n.txt" "src" { "x.cpp" "y.cpp" "app.cpp" } }\n',
+    'tree/app/a.h': '$enum+ A { a1 };\n',
+    'tree/app/b.h': '@import "a.h"\nint b;\n',
+    'tree/app/c.h': 'int c;\n',
+    'tree/app/n.txt': 'n\n',
+    'tree/app/src/x.cpp': '@import "app/b.h"\n@import "app/a.h"\n$init { }\nint x;\n',
+    'tree/app/src/y.cpp': '@import "app/c.h"\nint y;\n',
+    'tree/app/src/app.cpp': 'int app;\n',
+}
+DEPENDENCIES = 'qrexsource/x64/Debug/app.qrexdep'
+TRANSLATED = 'qrexsource/x64/Debug/app/'
+MAGIC = 0x2AEF78F1
+EACH_RUN = {DEPENDENCIES, 'projects.guids'}  # written by every run
+
+
+def write(path, content):
+    os.makedirs(os.path.dirname(path) or '.', exist_ok=True)
+    with open(path, 'wb') as f:
+        f.write(content if isinstance(content, bytes) else content.encode())
+
+
+def read(path):
+    with open(path, 'rb') as f:
+        return f.read()
+
+
+def write_tree(changes={}, age=3600):
+    """The standard tree with changes (None: left out), all of it written some time ago."""
+    for path, content in {**FILES, **changes}.items():
+        if content is not None:
+            write(path, content)
+    then = time.time() - age
+    for folder, _, names in os.walk('.'):
+        for name in names:
+            os.utime(os.path.join(folder, name), (then, then))
+
+
+def run(*arguments, status=0, limit=None, **options):
+    """Runs the tool; what it printed. `limit`: the size in bytes at which the writing of a file fails."""
+    def prepare():
+        if limit is not None:
+            resource.setrlimit(resource.RLIMIT_FSIZE, (limit, limit))
+    done = subprocess.run([BINARY, *(arguments or ['main.qrex'])], stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
+                          timeout=60, preexec_fn=prepare, restore_signals=limit is None, **options)
+    text = done.stdout.decode(errors='replace')
+    assert done.returncode == status, f'status {done.returncode}, not {status}, of {arguments}:\n{text}'
+    return text
+
+
+def expect(condition, what):
+    assert condition, what
+
+
+def files_of(*folders):
+    return sorted(os.path.relpath(os.path.join(folder, name)) for top in folders
+                  for folder, _, names in os.walk(top) for name in names)
+
+
+def contents(*folders):
+    return {path: read(path) for path in files_of(*folders)}
+
+
+def times(*folders):
+    return {path: os.stat(path).st_mtime_ns for path in files_of(*folders)}
+
+
+def changed(before, after):
+    return sorted(path for path in {**before, **after} if before.get(path) != after.get(path))
+
+
+def is_read_only(path):
+    return not os.stat(path).st_mode & (stat.S_IWUSR | stat.S_IWGRP | stat.S_IWOTH)
+
+
+def edit(path, content=None):
+    """Changes a source, later than all that was written before."""
+    time.sleep(0.02)
+    write(path, read(path) + b'// edited\n' if content is None else content)
+
+
+def dependencies():
+    """The dependency file: per path its imports, translation time and declaration flag; the two registries."""
+    data = read(DEPENDENCIES)
+    magic, crc, size = struct.unpack('<IIq', data[:16])
+    payload = data[16:]
+    expect(magic == MAGIC and size == len(payload) and crc == zlib.crc32(payload), 'damaged dependency file')
+    at = 0
+
+    def take(n):
+        nonlocal at
+        at += n
+        return payload[at - n:at]
+
+    def string():
+        return take(take(1)[0]).decode()  # all that is tested here is shorter than 128
+    files = {}
+    while path := string():
+        when, count = struct.unpack('<qI', take(12))
+        imports = [string() for _ in range(count)]
+        files[path] = (imports, when, take(1)[0])
+    registries = [{string(): [string() for _ in range(take(1)[0])] for _ in range(take(1)[0])} for _ in range(2)]
+    expect(at == len(payload), 'bytes behind the payload')
+    return files, registries
+
+
+# --- Modes
+
+def test_a_second_run_leaves_all_alone():
+    write_tree()
+    text = run()
+    holds(text, 'Qrex V2.20 Oct  7 2020\n', '$EXPORT_LIB = out/lib\n',
+          'PATH = /usr/bin;/bin\nINCLUDE = inc\nLIB = lib\n',
+          'Building workspace [ws/all.qrws]\n', 'Writing out/uinc/app/src/app.qrpj\n',
+          '\n------------------------------------- app  [Debug|x64] ------------------------------------------\n')
+    expect(re.search(r'\napp\.{85} +\d+\.\d\d ms\n\nCompleted\.{79} +\d+\.\d\d ms\n$', text), text)
+    expect(files_of('out') == ['out/tinc/app/a.h', 'out/tinc/app/b.h', 'out/tinc/app/c.h', 'out/tinc/app/n.txt',
+                               'out/uinc/.qrwsroot', 'out/uinc/app/a.h', 'out/uinc/app/b.h', 'out/uinc/app/c.h',
+                               'out/uinc/app/n.txt', 'out/uinc/app/src/app.qrpj', 'out/uinc/ws/all.qrws'],
+           files_of('out'))
+    expect(read('out/tinc/app/b.h') == read(TRANSLATED + 'b.h') != read('tree/app/b.h'), 'translated header')
+    expect(read('out/uinc/app/b.h') == read('tree/app/b.h'), 'untranslated header')
+    for path in files_of('out', 'qrexsource'):
+        expect(is_read_only(path) == (path not in (DEPENDENCIES, 'out/uinc/.qrwsroot')), 'read-only flag of ' + path)
+    before = times('.')
+    bytes_before = contents('qrexsource', 'out')
+    text = run()
+    lacks(text, 'Writing')
+    lacks(text, 'Deleting')
+    holds(text, 'Skipping out/uinc/app/src/app.qrpj\n')
+    expect(set(changed(before, times('.'))) <= EACH_RUN, changed(before, times('.')))
+    expect(contents('qrexsource', 'out') == bytes_before, 'the same bytes, dependency file included')
+
+
+def test_what_an_edit_makes_stale():
+    write_tree()
+    run()
+    for source, stale in [('a.h', ['a.h', 'b.h', 'x.cpp']), ('b.h', ['b.h', 'x.cpp']), ('c.h', ['c.h', 'y.cpp']),
+                          ('src/y.cpp', ['y.cpp']), ('n.txt', ['n.txt'])]:
+        edit('tree/app/' + source)
+        text = run('main.qrex', 'diagnostics=true')
+        expect(re.findall(r'^\* (.*)$', text, re.M) == stale, f'{source}: {text}')
+        lacks(run('main.qrex', 'diagnostics=true'), '\n* ')
+    # what a .cpp registers is written into the main source
+    edit('tree/app/src/y.cpp', '@import "app/c.h"\n$init { }\n')
+    text = run('main.qrex', 'diagnostics=true')
+    holds(text, '* y.cpp\n', f'Writing: {TRANSLATED}src/y.cpp\n', f'Writing: {TRANSLATED}src/app.cpp\n')
+    lacks(text, '* app.cpp')
+    holds(read(TRANSLATED + 'src/app.cpp').decode(), 'void _Register_x0()', 'void _Register_y0()')
+    os.remove(TRANSLATED + 'c.h')
+    expect(re.findall(r'^\* (.*)$', run('main.qrex', 'diagnostics=true'), re.M) == ['c.h'], 'a deleted output')
+    text = run('main.qrex', 'diagnostics=true', 'rebuildAll=true')
+    holds(text, f'\nDeleting {DEPENDENCIES}\n')
+    expect(text.count('\n* ') == 7, text)
+
+
+def test_clean_compile_show():
+    write_tree()
+    run()
+    holds(run('main.qrex', 'mode=show', '$COMPILE_FILE_PATH = "tree/app/src/x.cpp"'),
+          'Showing generated file in workspace [ws/all.qrws]\n', f'\n{TRANSLATED}src/x.cpp(1)\n')
+    edit('tree/app/src/y.cpp')
+    before = times('.')
+    text = run('main.qrex', 'mode=compile', '$COMPILE_FILE_PATH = "tree/app/src/y.cpp"')
+    holds(text, 'Compiling file tree/app/src/y.cpp...\n', f'Deleting {TRANSLATED}src/y.cpp\n',
+          '\n\nCompile completed....')
+    expect(changed(before, times('.')) == [DEPENDENCIES, TRANSLATED + 'src/y.cpp'], changed(before, times('.')))
+    for mode, path, message in [
+            ('show', 'tree/none.h', '\nFile is not part of an qrex project\n'),
+            ('show', 'nowhere/x.cpp', '\nSearch for .qrwsroot failed\n'),
+            ('show', 'x.cpp', '\nSearch for .qrwsroot failed\n'),
+            ('compile', 'tree/none.cpp', '\nCompilation aborted: File is not part of an qrex project\n'),
+            ('compile', 'tree/app/a.h', '\nCompilation aborted: File is not a cpp, c or asm file\n'),
+            ('compile', 'nowhere/x.cpp', '\nSearch for .qrwsroot failed\n')]:
+        holds(run('main.qrex', 'mode=' + mode, f'$COMPILE_FILE_PATH = "{path}"', status=1), message)
+    text = run('main.qrex', 'mode=clean')
+    holds(text, 'Cleaning workspace [ws/all.qrws]\n', f'Deleting {DEPENDENCIES}\n', f'Deleting {TRANSLATED}a.h\n')
+    expect(files_of('qrexsource') == [], 'all is deleted')
+    lacks(run('main.qrex', 'mode=clean'), 'Deleting')
+
+
+def test_gen_twice():
+    write_tree({'tree/app/c.h': None})
+    for compiler in ['gcc', 'vc6', 'vc9', 'vc14']:
+        text = run('main.qrex', 'mode=gen', 'compiler=' + compiler)
+        holds(text, 'Generating workspace [ws/all.qrws]\n', 'all.projects\n')
+        before = times('.')
+        text = run('main.qrex', 'mode=gen', 'compiler=' + compiler)
+        lacks(text, 'Writing ')
+        lacks(text, 'Creating')
+        expect(set(changed(before, times('.'))) <= EACH_RUN, changed(before, times('.')))
+    expect(read('tree/app/c.h') == b'', 'the missing file')
+    os.rename('tree/app', 'tree/was')
+    write('tree/app/src/app.qrpj', read('tree/was/src/app.qrpj'))
+    holds(run('main.qrex', 'mode=gen'), 'Creating missing file tree/app/a.h\n')
+    os.rename('tree/app/src', 'tree/src')
+    write('tree/app/src/app.qrpj', PROJECT + '{ "no" { "such.h" } }')
+    holds(run('main.qrex', 'mode=gen'), 'Creating missing file tree/app/no/such.h\nError creating tree/app/no/such.h\n')
+
+
+def test_repackaged_program_stays_executable():
+    write_tree({'tree/app/src/app.qrpj': '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nexport\n'
+                                         'config { "Debug|x64" }\n{ }\n', 'tree/x64/Debug/app.exe': '#!/bin/sh\n'})
+    os.chmod('tree/x64/Debug/app.exe', 0o755)
+    run('main.qrex', 'repackageExecutableTargets=false')
+    expect(files_of('out/lib') == [], 'not asked for')
+    run()
+    expect(os.access('out/lib/x64/Debug/app.exe', os.X_OK), 'execute permission')
+
+
+def test_parallel_build():
+    write_tree()
+    os.rename('main.qrex', 'all.translate.qrex')
+    write('tools/MSBuild', '#!/bin/sh\necho "$PATH" "$@" > log\nexit 3\n')
+    os.chmod('tools/MSBuild', 0o755)
+    text = run('*all.SLN', 'PATH("x64") = { "tools" "/bin" }')
+    command = 'MSBuild /verbosity:minimal /m /t:Build "/p:Platform=x64;Configuration=Debug" build_all.SLN'
+    holds(text, 'argv[1] = *all.SLN\n', '\nCompleted...', f'\n{command}\n{command} failed with error code 3\n'
+          'Parallel build with devenv....')
+    expect(read('log') == b'tools:/bin ' + command[8:].replace('"', '').encode() + b'\n', read('log'))
+    text = run('*all.sln', 'compiler=vc9', 'mode=gen')
+    holds(text, '\ndevenv build_all.sln /Build "Debug|x64"\n', 'failed with error code 127\n')
+
+
+# --- Bad input: an orderly end with status 1, the place, and what is wrong
+
+def test_bad_command_lines():
+    holds(run('x="1"', status=1), ' --> adding variable $x=1\nUsage...\nQrex pathToConfigFile\n')
+    expect(subprocess.run([BINARY], stdout=subprocess.PIPE).stdout ==
+           b'Qrex V2.20 Oct  7 2020\nUsage...\nQrex pathToConfigFile\n', 'no argument')
+    for argument in ['mode=clean', 'none.qrex', '.', '', '*x.qrex', '"unterminated', '/dev/null/x', 'none.sln']:
+        name = argument.replace('.sln', '.qrex')
+        holds(run(argument, status=1), f'argv[1] = {argument}\nException: Couldn\'t open file {name}\n')
+    write('empty.qrex', '')
+    holds(run('empty.qrex', status=1),
+          "\nERROR:  Missing setting: 'virtualTree' not specified\nError in config file empty.qrex\n")
+    run(b'\xff\xfe.qrex', status=1)
+
+
+JUNK = bytes(range(256)) * 8
+
+BAD_INPUT = [
+    # changes to the tree, then what the output holds, in order
+    ({'main.qrex': JUNK}, ['main.qrex(1) : ', '    while processing qrex config file : main.qrex\n']),
+    ({'main.qrex': CONFIG + '\n\nmoed = build'}, ['\nmain.qrex(15) : Syntax error: moed\n']),
+    ({'main.qrex': CONFIG + 'mode = bild'}, ['\nmain.qrex(13) : Invalid option : bild\n']),
+    ({'main.qrex': CONFIG + 'diagnostics = yes'}, ['\nmain.qrex(13) : Expected false/true after = when read yes\n']),
+    ({'main.qrex': CONFIG + 'workspaces += { "a"'}, ['\nmain.qrex(13) : Expected quoted string when read EOS\n']),
+    ({'main.qrex': CONFIG + '@import "none.inc"'}, ['\nmain.qrex(13) : Couldn\'t open file none.inc']),
+    ({'main.qrex': CONFIG + '@import "a.inc"', 'a.inc': '\nmoed'},
+     ['\na.inc(2) : Syntax error: moed\n', '\nmain.qrex(13) : while processing @import of a.inc\n']),
+    ({'main.qrex': CONFIG + '@import "main.qrex"'}, ['main.qrex(13) : Imports nested too deeply\n']),
+    ({'tree/ws/all.qrws': None}, ['\nError: Couldn\'t open workspace file ws/all.qrws\n']),
+    ({'tree/ws/all.qrws': None, 'tree/ws/all.qrws/x': ''}, ['\nError: Couldn\'t open workspace file ws/all.qrws\n']),
+    ({'tree/ws/all.qrws': JUNK}, ['tree/ws/all.qrws(1) : ', '\nError in workspace file tree/ws/all.qrws\n']),
+    ({'tree/ws/all.qrws': '"all" { "app"'}, ['\ntree/ws/all.qrws(1) : Expected double quoted string when read EOS\n']),
+    ({'tree/ws/all.qrws': '"all"\n{\n"none.qrws"\n}'},
+     ['\ntree/ws/all.qrws(3) : Couldn\'t open workspace file none.qrws\n']),
+    ({'tree/ws/all.qrws': '"all"\n{\n"none" { }\n}'},
+     ['Error: Couldn\'t open project file none/src/none.qrpj\n',
+      '\ntree/ws/all.qrws(3) : while reading project file none/src/none.qrpj\n']),
+    ({'tree/ws/all.qrws': '"all" {\n"ws/b.qrws" }', 'tree/ws/b.qrws': '"b" {\n\n"ws/all.qrws" }'},
+     ['\ntree/ws/b.qrws(3) : Workspace file includes itself : ws/all.qrws\n',
+      '\ntree/ws/all.qrws(2) : while reading workspace file ws/b.qrws\n']),
+    ({'tree/ws/all.qrws': '"all" ' + '{ "app" ' * 3000}, [' : Blocks nested too deeply\n']),
+    ({'tree/app/src/app.qrpj': None},
+     ['Error: Couldn\'t open project file app/src/app.qrpj\n', 'while reading project file app/src/app.qrpj\n']),
+    ({'tree/app/src/app.qrpj': JUNK}, ['tree/app/src/app.qrpj(1) : ', 'while reading project file app/src/app.qrpj\n']),
+    ({'tree/app/src/app.qrpj': HEAD + '\n{ "a.h"'},
+     ['\ntree/app/src/app.qrpj(4) : Expected quoted string when read EOS\n']),
+    ({'tree/app/src/app.qrpj': HEAD + 'config\n{\n"Debug"\n}\n{ }'},
+     ['\ntree/app/src/app.qrpj(5) : Config specifier "Debug" must be of the form name|platform\n']),
+    ({'tree/app/src/app.qrpj': HEAD + '{ ' + '"a" { ' * 3000}, [' : Blocks nested too deeply\n']),
+    ({'tree/app/src/app.qrpj': PROJECT + 'subproj { "base" }\n{ }'},
+     ['Error: Couldn\'t open project file base/src/base.qrpj\n', 'while reading project file app/src/app.qrpj\n']),
+    ({'tree/app/src/app.qrpj': HEAD + 'qrex\nconfig { "Release|x64" }\n{ }'},
+     ['Error: There is no configuration Debug|x64 in project app\n']),
+    ({'tree/app/src/app.qrpj': PROJECT + '{ "a.h" "src" { "../a.h" } "x" { "../a.h" } }'}, ['Completed']),
+    ({'tree/app/c.h': JUNK}, ['tree/app/c.h(1) : error : ']),
+    ({'tree/app/c.h': 'int c;\n}\n'}, ["\ntree/app/c.h(2) : error : Can't match }\n"]),
+    ({'tree/app/c.h': None}, ["Couldn't open file tree/app/c.h\n"]),
+    ({'tree/app/c.h': None, 'tree/app/c.h/x': ''}, ["Couldn't open file tree/app/c.h\n"]),
+    ({'tree/app/c.h': '\n@import "none.h"\n'}, ["\ntree/app/c.h(2) : error : Can't import file: none.h\n"]),
+    ({'tree/app/a.h': '@import "b.h"\n'},
+     ['\nERROR: Cycle detected in import directives.  Files in cycle are...\n    app/a.h\n    app/b.h\n',
+      "\ntree/app/a.h(1) : error : Can't import file: b.h"]),
+]
+
+
+def test_bad_input():
+    for changes, pieces in BAD_INPUT:
+        for name in os.listdir('.'):
+            shutil.rmtree(name) if os.path.isdir(name) else os.remove(name)
+        write_tree(changes)
+        text = run(status=0 if pieces == ['Completed'] else 1)
+        holds(text, *pieces)
+        expect(not [path for path in files_of('.') if path.endswith('.part')], 'temporaries stay behind')
+
+
+def test_failed_project_among_the_workspaces():
+    write_tree({'main.qrex': CONFIG + 'workspaces = { "none" "app" }'})
+    text = run(status=1)
+    holds(text, "Error: Couldn't open project file none/src/none.qrpj\n",
+          'Error: There is no configuration Debug|x64 in project \n')
+    text = run('main.qrex', 'exportPublicHeaders=false')
+    holds(text, 'Error: Couldn\'t open project file none/src/none.qrpj\n', ' app  [Debug|x64] ', '\nCompleted..')
+
+
+def test_symbolic_links_in_a_circle():
+    write_tree({'tree/app/src/app.qrpj': PROJECT + '{ "*.h" * }'})
+    os.symlink('.', 'tree/app/self')
+    os.symlink('../app', 'tree/app/again')
+    run()
+    expect(sorted(dependencies()[0]) == ['app/a.h', 'app/b.h', 'app/c.h'], dependencies())
+
+
+# --- Dependency file and identifiers
+
+def test_dependency_file_bytes():
+    write_tree({'tree/app/src/app.qrpj': PROJECT + '{ }'})
+    run()
+    expect(read(DEPENDENCIES) == struct.pack('<IIq', MAGIC, zlib.crc32(b'\0\0\0'), 3) + b'\0\0\0', read(DEPENDENCIES))
+    write_tree()
+    run()
+    files, registries = dependencies()
+    expect({path: (imports, flag) for path, (imports, _, flag) in files.items()} == {
+        'app/a.h': ([], 1), 'app/b.h': (['app/a.h'], 0), 'app/c.h': ([], 0), 'app/n.txt': ([], 0),
+        'app/src/app.cpp': ([], 0), 'app/src/x.cpp': (['app/b.h', 'app/a.h'], 0),
+        'app/src/y.cpp': (['app/c.h'], 0)}, files)
+    expect(registries == [{'app/src/x.cpp': ['A', 'x0']}, {}], registries)
+    epoch = 116444736000000000  # of file times, in 1970
+    expect(all(abs((when - epoch) / 1e7 - time.time()) < 60 for _, when, _ in files.values()), files)
+
+
+def test_damaged_dependency_file():
+    write_tree()
+    run()
+    whole = read(DEPENDENCIES)
+    bad_payload = b'\x05app/' + whole[17:]
+    damaged = [whole[:n] for n in range(0, len(whole), 7)]
+    damaged += [whole[:n] + bytes([whole[n] ^ 1 << n % 8]) + whole[n + 1:] for n in range(0, len(whole), 5)]
+    damaged += [b'', b'\0' * 16, JUNK, whole[:8] + b'\xff' * 8 + whole[16:], whole[:15] + b'\x7f' + whole[16:],
+                struct.pack('<IIq', MAGIC, zlib.crc32(bad_payload), len(bad_payload)) + bad_payload]
+    for content in damaged:
+        write(DEPENDENCIES, content)
+        text = run('main.qrex', 'diagnostics=true')
+        holds(text, f'No dependency file {DEPENDENCIES}\n')
+        expect(text.count('\n* ') == 7, text)
+        dependencies()
+    write(DEPENDENCIES, whole + b'rest')
+    lacks(run('main.qrex', 'diagnostics=true'), 'No dependency file')
+
+
+def test_identifier_file():
+    old = bytes(range(16))
+    write_tree()
+    write('projects.guids', b'\x02\x03app' + old + b'\x04gone' + old)
+    run()
+    expect(read('projects.guids') == b'\x02\x03app' + old + b'\x04gone' + old, read('projects.guids'))
+    for content in [b'\x02\x03app' + old, b'\x01\x03ap', b'\xff', b'\x7f' + JUNK, b'\x01\x03app' + old[:15]]:
+        write('projects.guids', content)
+        text = run()
+        holds(text, 'Error reading projects.guids : Deserialisation error\n', '\nCompleted')
+        made = read('projects.guids')
+        expect(made[:5] == b'\x01\x03app' and len(made) == 21 and made[5:] != old, made)
+        run()
+        expect(read('projects.guids') == made, 'a stable identifier')
+    os.remove('projects.guids')
+    os.mkdir('projects.guids')
+    holds(run(), "Error : Couldn't write projects.guids\n", '\nCompleted')
+    os.rmdir('projects.guids')
+    write('projects.guids', b'\x01\x03app' + old)
+    os.chmod('projects.guids', 0o444)
+    holds(run(), "Error : Couldn't write projects.guids\n", '\nCompleted')
+    expect(read('projects.guids') == b'\x01\x03app' + old, 'untouched')
+
+
+# --- Errors in the middle
+
+def test_nothing_is_lost_when_an_error_ends_the_run():
+    write_tree()
+    run()
+    edit('tree/app/src/x.cpp', '@import "app/b.h"\n@import "app/a.h"\n$init { }\n$init { }\n')
+    edit('tree/app/src/y.cpp', 'int y;\n$bad\n')
+    text = run(status=1)
+    holds(text, "\ntree/app/src/y.cpp(2) : error : '$bad' is not a valid directive")
+    lacks(text, '\napp...')
+    lacks(text, 'Completed')
+    main_before = read(TRANSLATED + 'src/app.cpp')
+    edit('tree/app/src/y.cpp', 'int y;\n')
+    text = run('main.qrex', 'diagnostics=true')
+    expect(re.findall(r'^Writing: .*/(.*)$', text, re.M) == ['y.cpp', 'app.cpp'], text)  # x.cpp was finished before
+    expect(b'_Register_x1' in read(TRANSLATED + 'src/app.cpp') and b'_Register_x1' not in main_before, 'registration')
+
+
+def test_a_failed_translation_keeps_its_imports():
+    # b.h fails ahead of its import of c.h, and c.h changed as well: mending the former must not hide the latter
+    write_tree({'tree/app/b.h': '@import "a.h"\n@import "c.h"\nint b;\n'})
+    run()
+    good = read('tree/app/a.h')
+    good_time = os.stat('tree/app/a.h').st_mtime_ns
+    edit('tree/app/c.h')
+    edit('tree/app/a.h', '$bad\n')
+    run(status=1)
+    write('tree/app/a.h', good)
+    os.utime('tree/app/a.h', ns=(good_time, good_time))
+    text = run('main.qrex', 'diagnostics=true')
+    holds(text, '* b.h\n', '* x.cpp\n', '* y.cpp\n')
+    lacks(run('main.qrex', 'diagnostics=true'), '\n* ')
+
+
+# --- Faults of the disk
+
+def test_what_is_in_the_way():
+    write_tree()
+    write('qrexsource', 'a file')
+    text = run(status=1)
+    holds(text, f'Error: File error ({TRANSLATED}a.h) : The system cannot find the path specified.\n',)
+    os.remove('qrexsource')
+    os.makedirs(TRANSLATED + 'c.h')
+    holds(run(status=1), f'Error: File error ({TRANSLATED}c.h) : ')
+    shutil.rmtree('qrexsource')
+    shutil.rmtree('out')
+    os.makedirs('out/uinc/app/src/app.qrpj')
+    os.makedirs('out/uinc/app/c.h')
+    text = run()
+    holds(text, 'Error: File error (out/uinc/app/src/app.qrpj) : ', '\n...Copy file failed\n', '\nCompleted')
+    shutil.rmtree('out')
+    write('out', 'a file')
+    holds(run(), '\n...Copy file failed\n', '\nCompleted')
+
+
+def test_full_disk():
+    write_tree({'tree/app/c.h': 'int c;\n' * 1000})
+    text = run(status=1, limit=4096)
+    holds(text, f'Error: File error ({TRANSLATED}c.h) : ')
+    expect(not os.path.exists(TRANSLATED + 'c.h'), 'half-written')
+    expect(not [path for path in files_of('.') if path.endswith('.part')], 'temporaries stay behind')
+    expect(dependencies()[0]['app/b.h'][1] != 0, 'what was finished is kept')
+    run()
+    whole = contents('qrexsource', 'out')
+    edit('tree/app/c.h', 'int c2;\n' * 1000)
+    run(status=1, limit=4096)
+    after = contents('qrexsource', 'out')
+    expect([path for path in whole if after[path] != whole[path]] in ([], [DEPENDENCIES]), 'the old files stay')
+    run()
+    expect(read(TRANSLATED + 'c.h').count(b'c2') == 1000, 'the next run recovers')
+
+
+def test_full_disk_on_a_file_system():
+    os.mkdir('small')
+    mount = subprocess.run(['mount', '-t', 'tmpfs', '-o', 'size=256k', 'tmpfs', 'small'], stderr=subprocess.DEVNULL)
+    if mount.returncode != 0:
+        raise Skipped('mount')
+    try:
+        os.chdir('small')
+        write_tree({'tree/app/c.h': 'int c;\n' * 20000})
+        text = run(status=1)
+        holds(text, f'Error: File error ({TRANSLATED}c.h) : There is not enough space on the disk.\n')
+        expect(not os.path.exists(TRANSLATED + 'c.h') and not os.path.exists(TRANSLATED + 'c.h.part'), 'half-written')
+    finally:
+        os.chdir('..')
+        subprocess.run(['umount', 'small'])
+
+
+# --- Runs that are killed
+
+def without_times(files):
+    return {path: content for path, content in files.items() if path not in EACH_RUN}
+
+
+def test_killed_at_any_point():
+    big = ''.join(f'int x{n};\n' for n in range(20000))
+    changes = {'tree/app/c.h': big, 'tree/app/src/y.cpp': '@import "app/c.h"\n$init { }\n' + big}
+    write_tree(changes)
+    begin = time.time()
+    run()
+    duration = time.time() - begin
+    wanted = without_times(contents('qrexsource', 'out'))
+    identifiers = read('projects.guids')
+    runs = 24
+    for i in range(runs):
+        if i % 4 == 0:
+            subprocess.run('rm -rf qrexsource out', shell=True)
+        edit('tree/app/c.h', big)  # the same text, but later
+        process = subprocess.Popen([BINARY, 'main.qrex'], stdout=subprocess.DEVNULL)
+        time.sleep(duration * 1.1 * i / runs)
+        process.kill()
+        process.wait()
+        for path, content in without_times(contents('qrexsource', 'out')).items():
+            expect(path.endswith('.part') or content == wanted[path], f'half-written: {path}')
+        if os.path.exists(DEPENDENCIES):
+            dependencies()
+        expect(read('projects.guids') == identifiers, 'identifiers')
+    run()
+    expect(without_times(contents('qrexsource', 'out')) == wanted, 'the next run recovers')
+    before = times('.')
+    run()
+    expect(set(changed(before, times('.'))) <= EACH_RUN, 'and is complete')
+
+
+def test_stale_temporaries_are_harmless():
+    write_tree()
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    for path in files_of('qrexsource', 'out') + ['projects.guids']:
+        write(path + '.part', JUNK)
+    subprocess.run('find qrexsource out -type f ! -name "*.part" -delete', shell=True)
+    run()
+    expect(without_times(contents('qrexsource', 'out')) == wanted, contents('qrexsource', 'out').keys())
+
+
+# --- With a compiler
+
+def test_compile_and_link():
+    need('g++')
+    write_tree({
+        'tree/ws/all.qrws': '"all" { "app" "prog" { "app" } }',
+        'tree/app/a.h': 'int f();\n', 'tree/app/src/x.cpp': '@import "app/a.h"\nint f() { return 42; }\n',
+        'tree/app/src/app.qrpj': PROJECT + '{ "a.h" "src" { "x.cpp" } }',
+        'tree/prog/src/prog.qrpj': '$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "prog"\n'
+                                   'config { "Debug|x64" }\nqrex\n{ "src" { "main.cpp" } }',
+        'tree/prog/src/main.cpp': '@import "app/a.h"\nint main() { return f(); }\n'})
+    text = run('main.qrex', 'translateOnly=false')
+    holds(text, 'Linking...\napp....', 'Linking...\nprog....', '\nCompleted....')
+    expect(subprocess.run(['out/lib/x64/Debug/prog']).returncode == 42, 'the program')
+    before = times('.')
+    text = run('main.qrex', 'translateOnly=false')
+    lacks(text, 'Linking')
+    touched = changed(before, times('.'))
+    expect(set(touched) <= EACH_RUN | {'qrexsource/x64/Debug/prog.qrexdep'}, touched)
+    edit('tree/app/src/x.cpp', '@import "app/a.h"\nint f() { return 43; }\n')
+    run('main.qrex', 'translateOnly=false')
+    expect(subprocess.run(['out/lib/x64/Debug/prog']).returncode == 43, 'linked again with the new library')
+    edit('tree/prog/src/main.cpp', '@import "app/a.h"\n\nint main() { return g(); }\n')
+    text = run('main.qrex', 'translateOnly=false')
+    holds(text, 'tree/prog/src/main.cpp(3) ...\n', 'qrexsource/x64/Debug/prog/src/main.cpp:3:',
+          '\nCompleted with 0 warnings, 1 errors.')
+    lacks(text, 'Linking')
+    lacks(text, '\nprog....')
+
+
+def in_folder(test):
+    """The test as a function that works in a temporary folder."""
+    @functools.wraps(test)
+    def run_there(_):
+        home, folder = os.getcwd(), tempfile.mkdtemp(prefix='qrex-')
+        os.chdir(folder)
+        try:
+            test()
+        finally:
+            os.chdir(home)
+            shutil.rmtree(folder, ignore_errors=True)
+    return run_there
+
+
+run_tests([in_folder(test) for name, test in list(globals().items())
+           if name.startswith('test_') and (name in sys.argv[2:] or not sys.argv[2:])])

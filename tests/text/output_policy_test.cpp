@@ -1,0 +1,107 @@
+// How files reach the disk: what is skipped, what is replaced, read-only flags, and the lines about it; timing lines.
+
+#include "text/output_policy.h"
+
+#include <regex>
+
+#include "text/scope_timer.h"
+#include "workspace/workspace_fixture.h"
+
+namespace qrex {
+namespace {
+
+class OutputPolicyTest : public WorkspaceTest {
+ protected:
+  static int WriteText(const std::string& text, const std::string& path) {
+    MemoryTextWriter writer;
+    writer << text;
+    return WriteIfChanged(writer, path);
+  }
+  static bool IsReadOnly(const std::string& path) {
+    return (std::filesystem::status(path).permissions() & std::filesystem::perms::owner_write) ==
+           std::filesystem::perms::none;
+  }
+  static void SetAge(const std::string& path, int seconds) {
+    std::filesystem::last_write_time(path,
+                                     std::filesystem::file_time_type::clock::now() - std::chrono::seconds(seconds));
+  }
+};
+
+TEST_F(OutputPolicyTest, WritesWhatDiffers) {
+  EXPECT_EQ(1, WriteText("a\nb\n", "x"));
+  EXPECT_EQ("a\r\nb\r\n", Read("x"));
+  EXPECT_EQ(0, WriteText("a\nb\n", "x"));
+  Write("x", "a\rb\n");
+  EXPECT_EQ(0, WriteText("a\nb\n", "x"));
+  EXPECT_EQ("a\rb\n", Read("x"));
+  EXPECT_EQ(1, WriteText("a\nb", "x"));
+  EXPECT_EQ(1, WriteText("", "empty"));
+  EXPECT_EQ(0, WriteText("", "empty"));
+  EXPECT_EQ("Writing x\nSkipping x\nSkipping x\nWriting x\nWriting empty\nSkipping empty\n", trace);
+}
+
+TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
+  Write("flagged", "old");
+  ChangeReadOnly("flagged", true);
+  EXPECT_EQ(0, WriteText("new", "flagged"));
+  EXPECT_EQ(0, WriteText("new", "none/x"));
+  std::filesystem::create_directories("folder");
+  EXPECT_EQ(0, WriteText("new", "folder"));
+  EXPECT_EQ(
+      "Writing flagged\nError: File error (flagged) : Access is denied.\n"
+      "Writing none/x\nError: File error (none/x) : The system cannot find the file specified.\n"
+      "Writing folder\nError: File error (folder) : Access is denied.\n",
+      trace);
+  EXPECT_EQ("old", Read("flagged"));
+  EXPECT_FALSE(FileExists("folder.part") || FileExists("flagged.part"));
+}
+
+TEST_F(OutputPolicyTest, CopiesWhatIsNewer) {
+  Write("from", "1");
+  SetAge("from", 100);
+  EXPECT_TRUE(CopyIfNewer("from", "to/a/b", true));
+  EXPECT_EQ("1", Read("to/a/b"));
+  EXPECT_TRUE(IsReadOnly("to/a/b"));
+  EXPECT_GT(LastWriteTime("to/a/b"), LastWriteTime("from") + 90 * 10000000ll);  // the copy is of now
+  Write("from", "2");
+  SetAge("from", 50);
+  EXPECT_TRUE(CopyIfNewer("from", "to/a/b", false));
+  EXPECT_EQ("1", Read("to/a/b"));
+  SetAge("from", -1);
+  EXPECT_TRUE(CopyIfNewer("from", "to/a/b", false));
+  EXPECT_EQ("2", Read("to/a/b"));
+  EXPECT_FALSE(IsReadOnly("to/a/b"));
+  EXPECT_TRUE(CopyIfNewer("none", "to/a/c", false));
+  EXPECT_FALSE(FileExists("to/a/c"));
+  EXPECT_EQ("", trace);
+  EXPECT_FALSE(CopyIfNewer("from", "to/a", false));
+  EXPECT_EQ("...Copy file failed\n", trace);
+}
+
+TEST_F(OutputPolicyTest, Deletes) {
+  Write("x", "");
+  ChangeReadOnly("x", true);
+  DeleteReporting("x");
+  DeleteReporting("x");
+  EXPECT_EQ("Deleting x\n", trace);
+  EXPECT_FALSE(FileExists("x"));
+}
+
+TEST_F(OutputPolicyTest, TimingLines) {
+  { ScopeTimer silent; }
+  EXPECT_EQ("", trace);
+  {
+    ScopeTimer timer;
+    timer.Stop();
+    timer.Label() << "app";
+  }
+  EXPECT_TRUE(std::regex_match(TakeTrace(), std::regex("app\\.{85} [ \\d]{4}\\.\\d\\d ms\n")));
+  {
+    ScopeTimer timer(true);
+    timer.Label() << std::string(100, 'x');
+  }
+  EXPECT_TRUE(std::regex_match(TakeTrace(), std::regex("x{88} [ \\d]{4}\\.\\d\\d ms\n")));
+}
+
+}  // namespace
+}  // namespace qrex

@@ -1,0 +1,297 @@
+// Project files: the model that comes of each statement and of the file tree, and every message.
+
+#include "text/output_policy.h"
+#include "workspace/file_filter.h"
+#include "workspace/workspace_fixture.h"
+
+namespace qrex {
+namespace {
+
+constexpr char kHeads[] = "$TARGET_TYPE = \"Console Application\"\n$ROOT_TO_PROJDIR = \"app\"\n";
+constexpr char kConfigs[] = "config { \"Debug|x64\" \"Release|x64\" [\"fast\" \"small\"] \"Debug|Win\" }\n";
+
+// Files, then subfolders. A file is its path, with its display name behind `=` where that differs, and `-` when
+// excluded.
+std::string Printed(const ProjectFolder& folder) {
+  std::string text;
+  for (const ProjectFile* file : folder.files) {
+    text += text.empty() ? "" : " ";
+    text += (file->excluded ? "-" : "") + file->path;
+    const size_t slash = file->path.rfind('/');
+    if (file->name != file->path.substr(slash + 1)) text += "=" + file->name;
+  }
+  for (const auto& subfolder : folder.subfolders) {
+    text += (text.empty() ? "" : " ") + subfolder->name + "{" + Printed(*subfolder) + "}";
+  }
+  return text;
+}
+
+std::string Printed(const OptionMap& options) {
+  std::string text;
+  for (const auto& [name, value] : options) text += name + "=" + value + ";";
+  return text;
+}
+
+class ProjectTest : public WorkspaceTest {
+ protected:
+  Project* TryLoad(const std::string& text) {
+    Restart();
+    trace.clear();
+    Write("tree/app/src/app.qrpj", text);
+    return workspace->LoadProject("app/src/app.qrpj");
+  }
+  Project& Load(const std::string& text) {
+    Project* project = TryLoad(text);
+    EXPECT_TRUE(project) << text << trace;
+    return project ? *project : *workspace->projects.front();
+  }
+  void AssertTree(const std::string& tree, const std::string& expected) {
+    EXPECT_EQ(expected, Printed(Load(kHeads + tree).rootFolder)) << tree;
+  }
+  // Per configuration what `print` makes of it, one line each.
+  template <typename Print>
+  std::string OfConfigs(const std::string& statements, Print print) {
+    std::string text;
+    for (const auto& config : Load(std::string(kHeads) + kConfigs + statements + "{ }").configs) {
+      text += config->name + "|" + config->platform + ":" + print(*config) + "\n";
+    }
+    return text;
+  }
+  void AssertCompilerText(const std::string& statements, const std::string& expected) {
+    EXPECT_EQ(expected, OfConfigs(statements, [](const ProjectConfig& config) { return config.compilerText; }))
+        << statements;
+  }
+  void AssertError(const std::string& text, const std::string& message) {
+    EXPECT_EQ(nullptr, TryLoad(text)) << text;
+    EXPECT_EQ("\ntree/app/src/app.qrpj" + message + "\n", trace) << text;
+  }
+};
+
+TEST_F(ProjectTest, Heads) {
+  const struct {
+    const char* type;
+    TargetType expected;
+    bool isStatic;
+    const char* extension;
+  } kRows[] = {
+      {"Application", TargetType::Application, false, "exe"},
+      {"Static Library", TargetType::StaticLibrary, false, "lib"},
+      {"Console Application", TargetType::ConsoleApplication, false, "exe"},
+      {"Dynamic-Link Library", TargetType::DynamicLinkLibrary, false, "dll"},
+      {"Utility Project", TargetType::UtilityProject, false, "???"},
+      {"Library", TargetType::StaticLibrary, true, "lib"},
+  };
+  settings.defaultToDll = false;
+  for (const auto& row : kRows) {
+    const Project& project = Load("$TARGET_TYPE = \"" + std::string(row.type) +
+                                  "\" $ROOT_TO_PROJDIR = \"a/b/c\" { \"\" as \"$(TARGET_TYPE)|$(TGT_EXTENSION)|"
+                                  "$(PROJNAME)|$(ROOT_TO_PROJDIR)|$(PROJDIR_TO_ROOT)\" { } }");
+    EXPECT_EQ(row.expected, project.targetType);
+    EXPECT_EQ(row.isStatic, project.libraryIsStatic);
+    EXPECT_EQ(std::string(row.type) + "|" + row.extension + "|c|a/b/c|../../..{}", Printed(project.rootFolder));
+    EXPECT_EQ("c a/b/c/src a_b_c",
+              project.name + " " + project.sourceDir + " " + workspace->projects[0]->MangledProjDir());
+    EXPECT_EQ("c", project.rootFolder.name);
+    EXPECT_EQ("tree tree/app/src/app.qrpj", project.rootDir + " " + project.filePath);
+  }
+  settings.defaultToDll = true;
+  const Project& project =
+      Load("$TARGET_TYPE = \"Library\" $ROOT_TO_PROJDIR = \"app\" $PROJDIR_TO_ROOT = \"\" qrex export { }");
+  EXPECT_EQ(TargetType::DynamicLinkLibrary, project.targetType);
+  EXPECT_EQ("", project.projDirToRoot);
+  EXPECT_TRUE(project.usesQrex && project.exported && !project.libraryIsStatic);
+}
+
+TEST_F(ProjectTest, Configurations) {
+  EXPECT_EQ("Debug|x64:\nRelease|x64:fast,small,\nDebug|Win:\nlate|p:t,\n",
+            OfConfigs("$A = \"t\" config { \"late|p\" [\"$(A)\"] }", [](const ProjectConfig& config) {
+              std::string tags;
+              for (const std::string& tag : config.tags) tags += tag + ",";
+              return tags;
+            }));
+  EXPECT_EQ("$A = t\n", trace);
+}
+
+TEST_F(ProjectTest, ScopesAndRawBlocks) {
+  AssertCompilerText("+cpp { -a   -b=1/**/c\n-d }",
+                     "Debug|x64: -a -b=1 c -d\nRelease|x64: -a -b=1 c -d\nDebug|Win: -a -b=1 c -d\n");
+  AssertCompilerText("+cpp (\"Debug\") { -a } +cpp (\"none\", \"x64\") { -b }",
+                     "Debug|x64: -a -b\nRelease|x64: -b\nDebug|Win: -a\n");
+  AssertCompilerText("+cpp (\"Debug|x64\", \"small\") { -a } +cpp (\"gcc|fast\") { -b } +cpp (\"vc9\") { -c }",
+                     "Debug|x64: -a\nRelease|x64: -a -b\nDebug|Win:\n");
+  AssertCompilerText(
+      "+cpp (\"Console Application|Debug\") { -a } +cpp (\"Application\") { -b } +cpp (\"Debug|\") { -c }",
+      "Debug|x64: -a\nRelease|x64:\nDebug|Win: -a\n");
+  AssertCompilerText("$V = \"v w\" +cpp { \"$(V)/$(CONFIG)\" $(PLATFORM) }",
+                     "Debug|x64: \"v w/Debug\" x64\nRelease|x64: \"v w/Release\" x64\nDebug|Win: \"v w/Debug\" Win\n");
+  AssertCompilerText("+cpp (\"Win\") { }", "Debug|x64:\nRelease|x64:\nDebug|Win: \n");
+  EXPECT_EQ("Debug|x64: -a -b\nRelease|x64: -a\nDebug|Win: -a -b\n",
+            OfConfigs("+link { -a } -link (\"Debug\") { -b }",
+                      [](const ProjectConfig& config) { return config.linkerText; }));
+}
+
+TEST_F(ProjectTest, OptionsOfConfigurations) {
+  settings.compiler = CompilerKind::vc9;
+  EXPECT_EQ(
+      "Debug|x64:PreprocessorDefinitions=A;P_x64;|\nRelease|x64:PreprocessorDefinitions=A;B;P_x64;|\n"
+      "Debug|Win:PreprocessorDefinitions=A;P_Win;|\n",
+      OfConfigs(
+          "+cpp { /D \"A\" /D \"B\" /D \"P_$(PLATFORM)\" } -cpp (\"Debug\") { /D \"B\" }",
+          [](const ProjectConfig& config) { return Printed(config.compilerOptions) + "|" + config.compilerText; }));
+  EXPECT_EQ(
+      "Debug|x64:CharacterSet=2;OutputDirectory=o/x64;\nRelease|x64:OutputDirectory=o/"
+      "x64;\nDebug|Win:CharacterSet=2;OutputDirectory=o/Win;\n",
+      OfConfigs("general { OutputDirectory = 'o/$(PLATFORM)' } general (\"Debug\") { CharacterSet = \"1\" CharacterSet "
+                "= \"2\" }",
+                [](const ProjectConfig& config) { return Printed(config.generalOptions); }));
+  EXPECT_EQ("Debug|x64:d/c|/\nRelease|x64:/|e/f\nDebug|Win:d/c|/\n",
+            OfConfigs("prebuildevent (\"Debug\") { \"d\" 'c' } postbuildevent (\"Release\") { \"e\" \"f\" }",
+                      [](const ProjectConfig& config) {
+                        EXPECT_FALSE(config.preLinkEvent.present);
+                        EXPECT_EQ(config.name == "Debug", config.preBuildEvent.present);
+                        return config.preBuildEvent.description + "/" + config.preBuildEvent.commandLine + "|" +
+                               config.postBuildEvent.description + "/" + config.postBuildEvent.commandLine;
+                      }));
+}
+
+TEST_F(ProjectTest, Names) {
+  AssertTree("{ \"a.h\" 'b.x' as \"B.cpp\" \"src\" { \"c.cpp\" } }", "app/a.h app/b.x=B.cpp src{app/src/c.cpp}");
+  AssertTree("{ \"s\" as \"S\" { \"a\" } \"\" as \"D\" { \"b\" \"\" { \"c\" } } \"S\" { \"d\" } }",
+             "S{app/s/a app/S/d} D{app/b app/c}");
+  AssertTree("{ \"../inc\" { \"a.h\" } \"..\" { \"b\" } \"../x\" as \"X\" { \"../c\" } }",
+             "inc{inc/a.h} ${b} X{c=../c}");
+  AssertTree("{ \"x\" { \"a.h\" } \"y\" { \"../x/a.h\" as \"other\" } }", "x{app/x/a.h} y{}");
+  AssertTree("{ \"a.h\" : exclude \"b.h\" : exclude, exclude (\"none\") \"d/e.h\" }",
+             "-app/a.h -app/b.h app/d/e.h=d/e.h");
+  const Project& project = Load(std::string("$TARGET_TYPE = \"Static Library\" $ROOT_TO_PROJDIR = \"app\"") +
+                                "{ \"app.CPP\" \"p.h\" \"src\" { \"q.H\" \"r.Py\" \".x\" \"noext\" } }");
+  std::string kinds;
+  for (const auto& [path, file] : project.filesByPath) {
+    kinds += path + " " + file->stem + " " + file->extension + " " + std::to_string(static_cast<int>(file->kind)) +
+             (file->isMainSource ? " main" : "") + (file->isPublicHeader ? " public\n" : "\n");
+  }
+  EXPECT_EQ(
+      "app/app.CPP app cpp 2 main\napp/p.h p h 3 public\napp/src/.x .x x 0\napp/src/noext noext  0\napp/src/q.H q h 3\n"
+      "app/src/r.Py r py 8\n",
+      kinds);
+}
+
+TEST_F(ProjectTest, Searches) {
+  for (const char* path : {"tree/app/a.h", "tree/app/b.cpp", "tree/app/.hid.h", "tree/app/s/c.h", "tree/app/s/t/d.H",
+                           "tree/app/u/e.txt", "more/app/f.h", "more/app/s/g.h", "more/app/v/w/h.h"}) {
+    Write(path, "");
+  }
+  AssertTree("{ \"*.h\" }", "app/a.h app/f.h");
+  AssertTree("{ \"*.h\" * }", "app/a.h app/f.h s{app/s/c.h app/s/g.h t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
+  AssertTree("{ [\"?.h\" \"*.txt\"] flat * }",
+             "app/s/t/d.H app/s/c.h app/u/e.txt app/a.h app/s/g.h app/v/w/h.h app/f.h");
+  AssertTree("{ - [\"*.h\" \"*.qrpj\"] * }", "app/b.cpp u{app/u/e.txt}");
+  AssertTree("{ + \"*.CPP\" - \"*.*\" }", "app/b.cpp");
+  AssertTree("{ directories - [\"s\" \"V\"] \"*.h\" * }", "app/a.h app/f.h");
+  AssertTree("{ directories + \"s\" \"s\" { \"*\" * : exclude } \"*.h\" * }",
+             "app/a.h app/f.h s{-app/s/c.h -app/s/g.h}");
+  AssertTree("directories + \"s\" directories \"t*\" { \"*.h\" * }",
+             "app/a.h app/f.h s{app/s/c.h app/s/g.h t{app/s/t/d.H}}");
+  AssertTree("{ \"s/c.h\" \"s/g.h\" \"*.h\" * }",
+             "app/s/c.h=s/c.h app/s/g.h=s/g.h app/a.h app/f.h s{t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
+  AssertTree("{ \"none\" { \"*\" * } }", "none{}");
+}
+
+TEST_F(ProjectTest, Patterns) {
+  EXPECT_TRUE(MatchesPattern("abc.H", "*.h") && MatchesPattern("a", "?") && MatchesPattern("", "*"));
+  EXPECT_TRUE(MatchesPattern("aXbXc", "a*b*c") && MatchesPattern("aab", "*ab") && MatchesPattern("x", "***x**"));
+  EXPECT_FALSE(MatchesPattern("abc", "ab") || MatchesPattern("ab", "abc") || MatchesPattern("", "?"));
+  EXPECT_FALSE(MatchesPattern(std::string(5000, 'a'), std::string(2000, '*') + "b"));
+}
+
+TEST_F(ProjectTest, OptionsOfFiles) {
+  auto records = [](const Project& project, const std::string& path) {
+    std::string text;
+    for (const auto& record : project.filesByPath.at(path)->configRecords) {
+      text += record->config->name + "|" + record->config->platform + (record->excluded ? "-" : "") + ":" +
+              record->addText + "/" + record->removeText + "/" + Printed(record->options) + "\n";
+    }
+    return text;
+  };
+  const std::string tree = "{ \"a.cpp\" : exclude (\"Win\"), +cpp (\"Debug\") { A$(CONFIG) }, -cpp (\"fast\") { B } }";
+  EXPECT_EQ("Debug|Win-: ADebug//\nDebug|x64: ADebug//\nRelease|x64:/ B/\n",
+            records(Load(std::string(kHeads) + kConfigs + tree), "app/a.cpp"));
+  settings.compiler = CompilerKind::vc9;
+  EXPECT_EQ("Debug|x64://PreprocessorDefinitions=M_x64;\nRelease|x64://PreprocessorDefinitions=M_x64;\n",
+            records(Load(std::string(kHeads) + kConfigs + "{ \"a.cpp\" : +cpp (\"x64\") { /D \"M_$(PLATFORM)\" } }"),
+                    "app/a.cpp"));
+}
+
+TEST_F(ProjectTest, Messages) {
+  for (const auto& [text, message] : std::initializer_list<std::pair<std::string, std::string>>{
+           {"$TARGET", "(1) : Expected 'TARGET_TYPE' when read TARGET"},
+           {"$TARGET_TYPE \"x\"", "(1) : Expected = after TARGET_TYPE when read \"x\""},
+           {"$TARGET_TYPE = 'x'", "(1) : Expected quoted string when read 'x'"},
+           {"$TARGET_TYPE = \"x\"\n$",
+            "(2) : Only target types \"Application\",\"Static Library\",\"Console Application\",\"Dynamic-Link "
+            "Library\",\"Utility Project\" supported"},
+           {"$TARGET_TYPE = \"Library\"\nqrex", "(2) : Expected '$' when read qrex"},
+           {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a\\\\b\"",
+            "(2) : Forward slashes must be used in \"a\\\\b\""},
+           {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a/\"\n",
+            "(2) : Path can't end with a trailing slash : \"a/\""},
+           {std::string(kHeads) + "$OTHER = \"x\"", "(3) : Expected 'PROJDIR_TO_ROOT' when read OTHER"},
+       }) {
+    AssertError(text, message);
+  }
+  for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
+           {"frob", "(3) : Expected { when read frob"},
+           {"config \"a|b\"", "(3) : Expected { when read \"a|b\""},
+           {"config { \"a\" }", "(3) : Config specifier \"a\" must be of the form name|platform"},
+           {"config { \"a|b|c\" }", "(3) : Config specifier \"a|b|c\" must be of the form name|platform"},
+           {"config {\n\"a|b\" [ x ] }", "(4) : Expected quoted string when read x"},
+           {"subproj { \"a\\\\b\" }", "(3) : Forward slashes must be used in \"a\\\\b\""},
+           {"toolfiles {\n\"a\\\\b\" }", "(4) : Forward slashes must be used in \"a\\\\b\""},
+           {"prelinkevent { \"a\" }", "(3) : Expected quoted string when read }"},
+           {"prelinkevent { \"a\" \"b\" \"c\" }", "(3) : Expected } after \"b\" when read \"c\""},
+           {"general { Key = \"a\" }", "(3) : Invalid key Key"},
+           {"general { \"Key\" }", "(3) : Expected identifier when read \"Key\""},
+           {"general (\"a\" \"b\") { }", "(3) : Expected comma or right parenthesis when read \"b\""},
+           {"general () { }", "(3) : Expected quoted string when read )"},
+           {"+ \"cpp\"", "(3) : Expected identifier when read \"cpp\""},
+           {"+asm { }", "(3) : Expected 'cpp' or 'link' when read asm"},
+           {"-asm { }", "(3) : Expected { when read -"},
+           {"-1", "(3) : Expected identifier when read 1"},
+           {"+link x", "(3) : Expected { when read x"},
+           {"+link { -a", "(3) : Unexpected end of file"},
+           {"directories \"plain\"", "(3) : Expected '[', '+' or '-' when read \"plain\""},
+           {"directories + x", "(3) : Expected [ after + or - when read x"},
+           {"@frob", "(3) : Syntax error: @frob"},
+           {"{ \"a\\\\b\" }", "(3) : Forward slashes must be used in \"a\\\\b\""},
+           {"{\n\"a\" as b }", "(4) : Expected quoted string when read b"},
+           {"{ x }", "(3) : Expected quoted string when read x"},
+           {"{ + x }", "(3) : Expected [ after + or - when read x"},
+           {"{ \"*\" flat }", "(3) : Expected * after flat when read }"},
+           {"{ \"a\" : frob }", "(3) : Unknown option : frob"},
+           {"{ \"a\" : exclude, }", "(3) : Unknown option : }"},
+           {"{ \"a\" : +link { } }", "(3) : Expected 'cpp' when read link"},
+           {"{ \"a\" { \"b\" }", "(3) : Expected quoted string when read EOS"},
+       }) {
+    AssertError(std::string(kHeads) + text, message);
+  }
+}
+
+TEST_F(ProjectTest, Imports) {
+  Write("more/inc", "@def all = \"*.h\" *\nconfig { \"c|p\" }\ndirectories - \"s\"");
+  Write("tree/app/s/a.h", "");
+  Write("tree/app/a.h", "");
+  const Project& project = Load(std::string(kHeads) + "@import \"inc\"\n{ all }");
+  EXPECT_EQ(1u, project.configs.size());
+  EXPECT_EQ("app/a.h", project.rootFolder.files.back()->path);
+  Write("more/inc", "\nconfig { \"c\" }");
+  EXPECT_EQ(nullptr, TryLoad(std::string(kHeads) + "\n@import \"inc\"\n{ }"));
+  EXPECT_EQ(
+      "\nmore/inc(2) : Config specifier \"c\" must be of the form name|platform\n"
+      "\ntree/app/src/app.qrpj(4) : while processing @import of more/inc\n",
+      trace);
+  Write("more/inc", "qrex\n{ }");
+  AssertError(std::string(kHeads) + "@import \"inc\"\n{ }", "(3) : Syntax error when read '{' in more/inc");
+}
+
+}  // namespace
+}  // namespace qrex
