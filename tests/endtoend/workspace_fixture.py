@@ -48,7 +48,7 @@ class Workspace:
 
     def run(self, *arguments, status=0):
         """Runs the tool; its standard output. Fails on another exit status."""
-        done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=300)
+        done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900)
         self.output = done.stdout
         assert done.returncode == status, f"status {done.returncode}, not {status}:\n{done.stdout}{done.stderr}"
         return done.stdout
@@ -57,7 +57,7 @@ class Workspace:
         """Runs a shell command with the tool on PATH as `Qrex`; its output."""
         path = f"{Path(self.binary).parent}:{os.environ['PATH']}"
         done = subprocess.run(command, shell=True, cwd=self.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
-                              text=True, timeout=300, env={**os.environ, "PATH": path, **environment})
+                              text=True, timeout=900, env={**os.environ, "PATH": path, **environment})
         assert done.returncode == status, f"{command}: status {done.returncode}:\n{done.stdout}"
         return done.stdout
 

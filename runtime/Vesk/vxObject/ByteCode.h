@@ -9,7 +9,8 @@ namespace vesk {
 
 enum EReflectedCode {
   RC_VOID = 0,
-  RC_STRING16 = 17,
+  RC_STRING8 = 16,
+  RC_STRING16,
   RC_CLASS = 32,
   RC_INTERFACE,
   RC_TYPEDEF,

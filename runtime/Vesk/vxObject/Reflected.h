@@ -267,6 +267,24 @@ ReflectedFunctor const& GetReflectedFunctor() {
   return _GetReflected(static_cast<T const*>(nullptr));
 }
 
+// An enumeration with a record prints its label.
+inline xostream& PrintEnum(xostream& os, ReflectedEnum const* record, int32 number) {
+  for (ssize_t i = 0; record && i < record->m_numLabels; ++i) {
+    if ((record->m_values ? record->m_values[i] : i) == number) return os << record->m_labels[i];
+  }
+  return os << number;
+}
+
+template <typename E>
+using EnumRecordExpression = decltype(static_cast<ReflectedEnum const&>(_GetReflected(std::declval<E const*>())));
+
+template <typename E, typename = std::enable_if_t<std::is_enum<E>::value>, typename = void>
+xostream& operator<<(xostream& os, E value) {
+  ReflectedEnum const* record = nullptr;
+  if constexpr (Detects<EnumRecordExpression, E>) record = &GetReflectedEnum<E>();
+  return PrintEnum(os, record, static_cast<int32>(value));
+}
+
 template <typename I>
 ConstStringZ GetIpcInterfaceName() {
   return _GetIpcInterfaceName(static_cast<I const*>(nullptr));

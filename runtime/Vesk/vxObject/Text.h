@@ -79,7 +79,7 @@ inline void AppendUtf8(std::string& text, uint32 c) {
     return;
   }
   const int more = c < 0x800 ? 1 : c < 0x10000 ? 2 : 3;
-  text += static_cast<char>((0xF00 >> more & 0xFF) | c >> 6 * more);
+  text += static_cast<char>((0xF00 >> (more + 1) & 0xFF) | c >> 6 * more);
   for (int i = more - 1; i >= 0; --i) text += static_cast<char>(0x80 | (c >> 6 * i & 0x3F));
 }
 
@@ -144,11 +144,6 @@ inline xostream& operator<<(xostream& os, std::string const& text) {
 inline xostream& operator<<(xostream& os, string16 const& text) {
   os.Write(Utf8Text(text));
   return os;
-}
-
-template <typename T, typename = std::enable_if_t<std::is_enum<T>::value>, typename = void>
-xostream& operator<<(xostream& os, T value) {
-  return os << static_cast<std::underlying_type_t<T>>(value);
 }
 
 template <typename T>

@@ -27,8 +27,8 @@ $polymorphic+ inline string8 Describe([Amount a]);
 $functor+ float64 Discount(float64 price, int32 pieces);
 
 $typedef+ xmap<string8,int32> Stock;
-$type xmap<string8,int32>;
-$type xvector<string8>;
+$type+ xmap<string8,int32>;
+$type+ xvector<string8>;
 
 $function+ float64 WithTax(float64 price, float64 rate = 0.2);
 $function+ inline int32 Dozens(int32 n) { return 12 * n; }

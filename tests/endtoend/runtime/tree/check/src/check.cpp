@@ -1,0 +1,28 @@
+@import "check.h"
+
+vxDefineTarget(check, 1)
+void Register_Project_check();
+void Unregister_Project_check();
+void CheckReflection();
+void CheckInterfaces();
+void CheckKinds();
+void CheckArchives();
+void CheckSchemas();
+void CheckChanges();
+void CheckRemote();
+void CheckGraph();
+void CheckCaches();
+void CheckVisiting();
+
+int main()
+{
+    Register_Project_check();
+    for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges, CheckRemote,
+                       CheckGraph, CheckCaches, CheckVisiting})
+    {
+        check();
+    }
+    Unregister_Project_check();
+    std::printf("%d checks, %d failures\n", g_checks, g_failures);
+    return g_failures > 0;
+}

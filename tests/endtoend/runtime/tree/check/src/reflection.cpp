@@ -1,0 +1,184 @@
+@import "check.h"
+@import "kinds/kinds.h"
+@import "kinds/graph.h"
+@import "kinds/remote.h"
+
+using vesk::Find;
+
+vesk::xstring FieldsOf(vesk::ConstStringZ name)
+{
+    vesk::ReflectedClass const& record = *Find<vesk::ReflectedClass>(name);
+    return vesk::TextOf([&](vesk::xostream& os) {
+        for (vesk::ssize_t i = 0; i < record.m_numFields; ++i)
+        {
+            os << vesk::TypeText({record.m_fields[i].m_type, record.m_strings}) << ' ' << record.m_fields[i].m_name << ';';
+        }
+    });
+}
+
+void CheckReflection()
+{
+    shapes::Point point;
+    point.x = 3;
+    point.y = 4;
+    vesk::ReflectedClass const& record = *Find<vesk::ReflectedClass>("shapes::Point");
+    CHECK(vesk::DecodeMetadata({record.m_metadata, record.m_strings}), "[note(\"a point\"),[1,2.5,true],plain]");
+    CHECK(FieldsOf("shapes::Point"), "int32 x;[\"unit\",7] int32 y;");
+    CHECK(record.m_size, sizeof(point));
+    CHECK(*reinterpret_cast<int32*>(reinterpret_cast<char*>(&point) + record.m_fields[1].m_offset), 4);
+    typedef int32 (*SumFn)(shapes::Point const*, int32);
+    CHECK(record.m_methods[0].m_name, "Sum");
+    CHECK(reinterpret_cast<SumFn>(record.m_methods[0].m_function)(&point, 5), 12);
+    CHECK(record.m_methods[0].m_isConst && !record.m_methods[1].m_isConst, true);
+    CHECK(vesk::TargetOf(record)->m_name, "shapes");
+
+    // Values known only by their record.
+    shapes::Point copy[2];
+    record.m_ops.m_copyConstruct(copy, 1, &point, 0, 1);
+    CHECK(record.m_ops.m_equal == nullptr && record.m_ops.m_print == nullptr, true);
+    CHECK(copy[1], "3/4");
+    vesk::ReflectedClass const& box = *Find<vesk::ReflectedClass>("shapes::Box");
+    const vesk::ptr<vesk::IObject> object = box.m_create();
+    CHECK(object->GetReflectedClass() == &box, true);
+    CHECK(box.m_numBaseInterfaces, 3);
+    CHECK(vesk::QueryInterface<shapes::INamed>(object)->Name(), "box");
+    CHECK(bool(vesk::QueryInterface<kinds::IDoc>(object)), false);
+    object->DestroyObject();
+
+    vesk::ReflectedEnum const& colour = *Find<vesk::ReflectedEnum>("shapes::Colour");
+    CHECK(colour.m_numLabels, 3);
+    CHECK(vxMakeString(colour.m_labels[2] << colour.m_values[2] << colour.m_enabled[2]), "Blue6false");
+    CHECK(shapes::Refined(), "B");
+    CHECK(shapes::Refined(8).Label(), "D");
+    CHECK(shapes::Refined::IsEnabled(3), false);
+    CHECK(shapes::Level(shapes::Level::High) == shapes::Level::High, true);
+
+    vesk::ReflectedInterface const& shape = *Find<vesk::ReflectedInterface>("shapes::IShape");
+    CHECK(shape.m_numInheritedMethods, 6);
+    CHECK(shape.m_attributes[1].m_name, "label");
+    CHECK(vesk::TypeText({shape.m_attributes[1].m_type, shape.m_strings}), "[\"read only\"] string8 const");
+    CHECK(vesk::TypeText({shape.m_methods[1].m_args[0].m_type, shape.m_strings}), "[\"factor\"] float64");
+    CHECK(vesk::DecodeMetadata({shape.m_methods[1].m_metadata, shape.m_strings}), "[1]");
+
+    vesk::ReflectedVariant const& value = *Find<vesk::ReflectedVariant>("kinds::Value");
+    CHECK(value.m_numItems, 11);
+    CHECK(vesk::TypeText({value.m_items[1].m_type, value.m_strings}), "[\"text\"] string8");
+    CHECK(Find<vesk::ReflectedFunctor>("kinds::Callback")->m_numArgs, 2);
+    typedef int32 (*ThriceFn)(int32);
+    CHECK(reinterpret_cast<ThriceFn>(Find<vesk::ReflectedGlobalFunction>("kinds::Thrice")->m_function)(4), 12);
+    vesk::ReflectedGlobalVariable const& count = *Find<vesk::ReflectedGlobalVariable>("kinds::g_count");
+    CHECK(*static_cast<int32 const*>(count.m_address), 8);
+    CHECK(Find<vesk::ReflectedTypedef>("kinds::Numbers") != nullptr, true);
+    CHECK(kinds::GetTypedefName_Known(), "kinds::Known");
+
+    // Types: of `$type`, through typedefs, and those of the library.
+    vesk::ReflectedTypedef const& numbers = *Find<vesk::ReflectedTypedef>("kinds::Numbers");
+    CHECK(vesk::TypeText({numbers.m_type, numbers.m_strings}), "xvector<int32>");
+    vesk::ReflectedType type;
+    type.m_code = vesk::RC_VECTOR;
+    type.m_inner.resize(1);
+    type.m_inner[0].m_code = vesk::RC_STRING8;
+    const vesk::xvector<vesk::string8> words = {"a", "b"};
+    CHECK(vesk::TextOf([&](vesk::xostream& os) { vesk::PrintValue(os, type, &words); }), "[a,b]");
+    type.m_code = vesk::RC_LIST;
+    CHECK(vesk::FindTypeOps(type) == nullptr, true);
+
+    CHECK(vesk::TypeTraits<shapes::Box>::kind == vesk::TTK_class, true);
+    CHECK((vesk::ImplementsInterface<shapes::Box, vesk::IObject>), true);
+    CHECK((vesk::ImplementsInterface<shapes::Box, kinds::IDoc>), false);
+    CHECK((vesk::IsSuperInterface<vesk::IObject, shapes::INamedShape>), true);
+    CHECK(bool(vesk::InterfaceTypeTraits<kinds::ICalc>::is_rmi), true);
+    CHECK(vesk::RegisterReflectedClass(&record, nullptr) == vesk::NSE_OK, true);
+    vesk::ReflectedClass other = record;
+    CHECK(vesk::RegisterReflectedClass(&other, nullptr) == vesk::NSE_ALREADY_DEFINED, true);
+}
+
+void CheckInterfaces()
+{
+    shapes::Box box, other;
+    const vesk::ptr<shapes::INamedShape> both(&box);
+    const vesk::ptr<shapes::IShape> shape = both;
+    both->Scale(3);
+    shape->size = 4;
+    shape->colour = shapes::Green;
+    shape->named = vesk::ptr<shapes::INamed>(&other);
+    CHECK(both->Area(), 9);
+    CHECK(int32(shape->size), 4);
+    CHECK(vesk::string8(shape->label), "label");
+    CHECK(shape->colour == shapes::Green, true);
+    CHECK(shape->named->Name(), "box");
+    const vesk::ptr<vesk::IObject> object = both;
+    CHECK(object == vesk::ptr<vesk::IObject>(&box), true);
+    CHECK(bool(vesk::ptr<shapes::INamed>()), false);
+}
+
+void CheckKinds()
+{
+    using kinds::Value;
+    vesk::xvector<Value> values;
+    values.push_back(Value());
+    values.push_back(Value(vesk::string8("text")));
+    values.push_back(Value::ratio(2.5));
+    values.push_back(Value::point(1, 2));
+    values.push_back(Value::list({1, 2}));
+    values.push_back(kinds::Size(3));
+    values.push_back(Value::numbers({4, 5}));
+    values.push_back(Value::name("n"));
+    values.push_back(Value::level(shapes::Level::High));
+    CHECK(values, "[7,text,ratio(2.5),point(1,2),list([1,2]),Size(3,3,Red,Mid),numbers([4,5]),name(n),level(High)]");
+    CHECK(values[4].as<Value::list>().items[1], 2);
+    CHECK(values[4].is<Value::list>() && !values[4].is<Value::point>(), true);
+    vesk::Archive ar;
+    ar << values;
+    vesk::InputArchive input(ar);
+    vesk::xvector<Value> read;
+    input >> read;
+    CHECK(read == values, true);
+    CHECK(input.Remaining(), 0);
+    CHECK(kinds::Nothing(), "void");
+    kinds::Tree tree = kinds::Tree::node({kinds::Tree::leaf(1), kinds::Tree()});
+    CHECK(tree, "node([leaf(1),void])");
+
+    CHECK(kinds::Describe(kinds::Small(1), 3, kinds::Small(vesk::string8("s"))), 13);
+    CHECK(kinds::Local(6), 6);
+    CHECK(vesk::ObjectHeap::Get().Count(), 1);
+    CHECK(vesk::ObjectHeap::Get().Collect({}), 1);
+
+    kinds::Stack* stack = kinds::MakeStack();
+    Push(stack, 2);
+    Push(stack, 3);
+    CHECK(Depth(stack), 5);
+
+    shapes::Point point;
+    point.x = 5;
+    $makefunctor kinds::Callback plus { return a + int32(b.size()); }
+    $makefunctor kinds::Callback bound(&point, shapes::Point) { return a + x; }
+    $makeconstfunctor kinds::Callback constant(&point, shapes::Point) { return a - x; }
+    CHECK(plus(1, "ab"), 3);
+    CHECK(bound(1, ""), 6);
+    CHECK(constant(7, ""), 2);
+    CHECK(bound == plus, false);
+    kinds::Callback none;
+    CHECK(none ? 1 : 0, 0);
+    none = bound;
+    CHECK(none(2, ""), 7);
+    none = vesk::null;
+    CHECK(none == kinds::Callback(), true);
+
+    kinds::Mixed mixed;
+    mixed.counter = 0;
+    mixed.own = 2;
+    mixed.value = 9;
+    mixed.Both(3);
+    mixed.inlist = 4;
+    CHECK(vxMakeString(mixed.counter << mixed.anonymous << mixed.value << mixed.foreign << mixed.inlist), "13984");
+    CHECK(mixed.Me() == &mixed, true);
+    CHECK(mixed.Sum(), 42);
+    CHECK(mixed.Getown(), 2);
+    CHECK(FieldsOf("kinds::Mixed"), "int32 own;");
+    kinds::Delegates delegates;
+    delegates.m_named = &mixed;
+    CHECK(delegates.Name(), "mixed");
+    kinds::TemplateObject<int32> object;
+    CHECK(vesk::ptr<shapes::INamed>(&object)->Name(), "template");
+}

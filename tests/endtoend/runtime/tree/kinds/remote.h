@@ -1,0 +1,33 @@
+@import "Vesk/vxObject/IObject.h"
+@import "kinds/models.h"
+
+$warning(disable: 1009)
+
+namespace kinds
+{
+
+$interface+ rmi ICalc : vesk::IObject
+{
+    void Add([in] int32 a, [in] const string8& b, [out] int32& sum);
+    void Swap([inout] string8& a, [inout] int32& b) const;
+    void Notify([in] int32 n);
+    void Ping();
+    void Take([copy] Size* size);
+    void Vectors([in] const xvector<int32>& in, [out] xvector<int32>& out);
+};
+$interface rmi IPlain { void Ping(); };
+$interface ipc IEmptyIpc { };
+
+$class+ Calc isa ICalc
+{
+public:
+    void Add(int32 a, const vesk::string8& b, int32& sum) { sum = a + int32(b.size()); }
+    void Swap(vesk::string8& a, int32& b) const { a += "!"; b = -b; }
+    void Notify(int32 n) { notified += n; }
+    void Ping() { ++notified; }
+    void Take(Size* size) { notified += size->width; delete size; }
+    void Vectors(const vesk::xvector<int32>& in, vesk::xvector<int32>& out) { out = in; out.push_back(1); }
+    int32 notified = 0;
+};
+
+}
