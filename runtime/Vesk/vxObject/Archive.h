@@ -23,6 +23,7 @@ struct Archive {
 
   xvector<octet_t> m_bytes;
   std::unordered_map<void const*, uint32> m_objects;  // written so far, by number
+  bool m_writesAddresses = false;                     // of objects, in place of the objects
 };
 
 // Reads what an Archive wrote.

@@ -41,8 +41,9 @@ class Path {
   ssize_t m_size = 0;
 };
 
-// Writes a path whose keys have no fixed size.
+// Writes a path whose keys have no fixed size. A reference as a key is the address of its object.
 struct FieldPathArchive : Archive {
+  FieldPathArchive() { m_writesAddresses = true; }
   void InitPath(Path& path) const {
     std::copy(m_bytes.begin(), m_bytes.end(), path.InitHeapBuffer(static_cast<ssize_t>(m_bytes.size())));
   }
@@ -101,6 +102,12 @@ class PathPrinter {
       int32 value;
       m_bytes.Read(&value, sizeof(value));
       return PrintValue(m_os, type, &value);
+    }
+    if (type.m_code == RC_PREF || type.m_code == RC_CREF) {
+      void* object;
+      m_bytes.Read(&object, sizeof(object));
+      m_os << object;
+      return;
     }
     TypeOps const* ops = FindTypeOps(type);
     if (!ops || !ops->m_construct || !ops->m_deserialise) return;

@@ -9,6 +9,10 @@ namespace vesk {
 
 // Writes the number of the object. Answers whether the object must follow.
 inline bool WriteObjectNumber(Archive& ar, void const* object) {
+  if (ar.m_writesAddresses) {
+    ar.Write(&object, sizeof(object));
+    return false;
+  }
   if (!object) {
     SerialiseVariableLengthUint(ar, 0);
     return false;

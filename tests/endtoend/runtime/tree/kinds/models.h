@@ -74,6 +74,7 @@ $class+ Doc isa IDoc : model
     xmap<string8,Size> sizes;
     xset<int32> tags;
     xset<movable<pref<IDoc>>> docs;
+    xset<pref<IDoc>> fixedDocs;
     xvector<movable<pref<IDoc>>> list;
     Size size;
     pref<IDoc> next;
@@ -83,7 +84,7 @@ $class+ Doc isa IDoc : model
     $schema
     {
         1: + title + pages + count
-        2: - pages + lines + marks + wide + grid + notes + bytes + sizes + tags + docs + list + size + next
+        2: - pages + lines + marks + wide + grid + notes + bytes + sizes + tags + docs + fixedDocs + list + size + next
         3: + total + dynamic
     }
     $evolve { lines (pages) { lines = vesk::xvector<int32>(pages); } total (count) { total = count; } }

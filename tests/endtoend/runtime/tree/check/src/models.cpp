@@ -136,7 +136,9 @@ void CheckChanges()
     CHECK(taken(), "[1size.colour,2total,2total]");
     doc.next = vesk::pref<IDoc>(&doc);
     CHECK(doc.docs.Insert(doc.next), true);
-    CHECK(taken(), "[1next,3docs]");
+    CHECK(doc.fixedDocs.Insert(doc.next) && doc.fixedDocs.read().Contains(doc.next), true);
+    CHECK(Doc::GetfixedDocsElementPath(doc.next).Size(), 9);
+    CHECK(taken().size(), 3);
     CHECK(doc.marks[2] == 7 && doc.grid[1][0] == 3, true);
     CHECK(doc.size.path() == Doc::GetsizePath() && doc.size.path().Holds(doc.size.colour.path()), true);
 
