@@ -81,3 +81,48 @@ inline std::map<xstring, TypeOps const*>& TypeOpsTable() {
 }
 
 // The first table of a type stays.
+inline bool RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops) {
+  TypeOpsTable().insert({type.m_text, ops});
+  return true;
+}
+
+// Null when nobody registered the type. Decorators, metadata and typedefs are looked through.
+inline TypeOps const* FindTypeOps(ReflectedType const& type) {
+  if (type.m_code >= RC_VOLATILE && type.m_code <= RC_OFFSETTABLE) return FindTypeOps(type.m_inner.front());
+  if (type.m_code == RC_CLASS) {
+    ReflectedClass const* record = Find<ReflectedClass>(type.m_name);
+    return record ? &record->m_ops : nullptr;
+  }
+  if (type.m_code == RC_VARIANT) {
+    ReflectedVariant const* record = Find<ReflectedVariant>(type.m_name);
+    return record ? &record->m_ops : nullptr;
+  }
+  if (type.m_code == RC_ENUM) return &MakeTypeOps<int32>();
+  if (type.m_code == RC_TYPEDEF) {
+    ReflectedTypedef const* record = Find<ReflectedTypedef>(type.m_name);
+    return record ? FindTypeOps(DecodeType({record->m_type, record->m_strings})) : nullptr;
+  }
+  ReflectedType plain = type;
+  plain.m_metadata.clear();
+  const auto at = TypeOpsTable().find(vxMakeString(plain));
+  return at == TypeOpsTable().end() ? nullptr : at->second;
+}
+
+inline TypeOps const* FindTypeOps(ReflectionByteCode code) { return FindTypeOps(DecodeType(code)); }
+
+// Prints a value known only by its type: an enumeration by its label, the items of containers one by one, "?" when the
+// type is not registered.
+inline void PrintValue(xostream& os, ReflectedType const& type, void const* value) {
+  if (type.m_code == RC_ENUM) {
+    PrintEnum(os, Find<ReflectedEnum>(type.m_name), *static_cast<int32 const*>(value));
+    return;
+  }
+  TypeOps const* ops = FindTypeOps(type);
+  if (ops && ops->m_print) {
+    ops->m_print(os, value);
+  } else {
+    os << '?';
+  }
+}
+
+}  // namespace vesk

@@ -50,6 +50,7 @@ $adt+ Stack : [ "adt" ]
 {
     int32 Depth() const;
     void Push(int32 n);
+    void Drop();
 };
 $function+ Stack* MakeStack();
 

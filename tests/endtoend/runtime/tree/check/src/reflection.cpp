@@ -148,6 +148,7 @@ void CheckKinds()
     Push(stack, 2);
     Push(stack, 3);
     CHECK(Depth(stack), 5);
+    Drop(stack);
 
     shapes::Point point;
     point.x = 5;

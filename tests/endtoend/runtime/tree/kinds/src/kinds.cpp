@@ -17,6 +17,7 @@ $adt+ implement Stack
 public:
     int32 Depth() const { return m_depth; }
     void Push(int32 n) { m_depth += n; }
+    void Drop() { delete this; }
 
 private:
     int32 m_depth = 0;
