@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
-"""Translates a source of every kind and variation, builds it with g++ against the runtime, and runs what comes of it; the
-same for the tour. clang++ compiles the same text without a complaint."""
+"""Translates a source of every kind and variation, builds it with g++ against the runtime, and runs what comes of it;
+the same for the tour. clang++ compiles the same text without a complaint."""
 
 import shutil
 import sys

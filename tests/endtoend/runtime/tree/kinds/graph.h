@@ -44,7 +44,8 @@ public:
     $cache void keyed(vesk::string8& out, int32 n) const { out = vesk::string8(n, 'x'); }
     $cache <<async>> int32 later() const { return source + 1; }
     $cache <<async io>> void laterInto(int32& out) const with int32 in = source; { out = in * 2; }
-    $cache <<async queue(1)>> int32 laterKeyed(int32 k) const with vesk::xvector<int32> in { in.push_back(source); in.push_back(k); }
+    $cache <<async queue(1)>> int32 laterKeyed(int32 k) const
+        with vesk::xvector<int32> in { in.push_back(source); in.push_back(k); }
     {
         return in[0] + in[1];
     }

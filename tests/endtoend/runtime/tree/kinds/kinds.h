@@ -108,7 +108,10 @@ public:
 };
 $struct Post : shapes::Point mixin [ Counter ] Multi { };
 $struct RawAndModel : shapes::Point model { int32 q; } { };
-$class+ Delegates isa shapes::INamed : mixin [ { vesk::ptr<shapes::INamed> m_named; vesk::ptr<shapes::INamed> Get() const { return m_named; } } ]
+$class+ Delegates isa shapes::INamed : mixin
+[
+    { vesk::ptr<shapes::INamed> m_named; vesk::ptr<shapes::INamed> Get() const { return m_named; } }
+]
 {
 public:
     vesk::string8 Name() const { return Get()->Name(); }

@@ -17,8 +17,8 @@ void CheckVisiting();
 int main()
 {
     Register_Project_check();
-    for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges, CheckRemote,
-                       CheckGraph, CheckCaches, CheckVisiting})
+    for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
+                       CheckRemote, CheckGraph, CheckCaches, CheckVisiting})
     {
         check();
     }

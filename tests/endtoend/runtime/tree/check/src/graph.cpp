@@ -62,7 +62,9 @@ void CheckCaches()
     CHECK(c.keyed(3), "xxx");
     CHECK(c.filled(), "[20,20,20]");
 
-    auto async = [&c] { return vxMakeString(c.later() << ' ' << c.laterInto() << ' ' << c.laterKeyed(4) << ' ' << c.laterPlain(3, 4)); };
+    auto async = [&c] {
+        return vxMakeString(c.later() << ' ' << c.laterInto() << ' ' << c.laterKeyed(4) << ' ' << c.laterPlain(3, 4));
+    };
     CHECK(async(), "0 0 0 0");
     CHECK(vesk::RunAsyncCalculations(), 4);
     CHECK(async(), "21 40 24 12");

@@ -11,7 +11,8 @@ vesk::xstring FieldsOf(vesk::ConstStringZ name)
     return vesk::TextOf([&](vesk::xostream& os) {
         for (vesk::ssize_t i = 0; i < record.m_numFields; ++i)
         {
-            os << vesk::TypeText({record.m_fields[i].m_type, record.m_strings}) << ' ' << record.m_fields[i].m_name << ';';
+            vesk::ReflectedField const& field = record.m_fields[i];
+            os << vesk::TypeText({field.m_type, record.m_strings}) << ' ' << field.m_name << ';';
         }
     });
 }
