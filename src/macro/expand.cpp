@@ -12,8 +12,11 @@ namespace {
 
 constexpr int kMaxNesting = 1000;
 int nesting = 0;
+int64_t parts = 0;  // of the text at nesting 0
 
 }  // namespace
+
+ExpansionLimits expansionLimits;
 
 bool ImportHandler::ImportPath(const std::string&, const char*) { return false; }
 
@@ -37,6 +40,9 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
       m_pendingBegin(text.begin),
       m_settled(text.begin) {
   if (nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
+  if (nesting == 0) parts = 0;
+  if (++parts > expansionLimits.parts) throw LexScannerException("Too many macro expansions", text.begin);
+  CheckLength(text.Size());
   ++nesting;
 }
 
@@ -173,7 +179,14 @@ void ExpansionContext::CopySource(const TextRange& text, int64_t indent) {
 
 void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
 
+void ExpansionContext::CheckLength(size_t added) const {
+  if (static_cast<int64_t>(m_sink.output.size() + added) > expansionLimits.bytes) {
+    throw LexScannerException("Expanded text is too long", m_tokenText);
+  }
+}
+
 void ExpansionContext::EmitGenerated(std::string_view text) {
+  CheckLength(text.size());
   m_sink.WriteGenerated(text, *AnchorForTemporary(), m_outIndent);
 }
 

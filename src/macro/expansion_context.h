@@ -41,6 +41,7 @@ class ExpansionContext {
   void DropTo(const char* position);
   void DropToScanner() { DropTo(m_scanner.begin); }
   void EmitGenerated(std::string_view text);
+  void CheckLength(size_t added) const;
   int64_t CurrentColumn() const { return m_sink.column < 0 ? m_outIndent : m_sink.column; }
   const TextRange* AnchorForTemporary() const { return m_anchor ? m_anchor : &m_tokenText; }
   void StripIndentation(int64_t width);

@@ -1,0 +1,23 @@
+// What tools print: messages are counted, and those about generated files are followed back to their source.
+#include "build/tool_output.h"
+#include "fuzz/fuzz_world.h"
+
+using namespace qrex;
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  if (size == 0) return 0;
+  const std::string output(reinterpret_cast<const char*>(data) + 1, size - 1);
+  static fuzz::World world(CompilerKind::gcc, "{ \"t.h\" \"src\" { \"app.cpp\" } }\n");
+  world.settings.compiler = data[0] % 2 ? CompilerKind::gcc : CompilerKind::vc14;
+  static const bool isChecked = world.workspace->CheckFileReferences();
+  static ProjectBuilder builder(world.settings, world.App(), *world.App().configs.front());
+  fuzz::Run([&] {
+    if (isChecked && !builder.FindFile("app/t.h")) __builtin_trap();
+    ScannedFile& header = builder.GetScannedFile(*builder.FindFile("app/t.h"));
+    header.translated = true;
+    header.sourceText = "a\nb\n";
+    header.lineTable = {nullptr, header.sourceText.data()};
+    ScanToolOutput(builder, output);
+  });
+  return 0;
+}

@@ -1,0 +1,20 @@
+// The translator over a header, then over the source that registers what the header declares.
+#include "fuzz/fuzz_world.h"
+
+using namespace qrex;
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  const std::string text(reinterpret_cast<const char*>(data), size);
+  if (text.find("python") != std::string::npos) return 0;
+  expansionLimits = {10'000, 1 << 20};
+  fuzz::Run([&] {
+    fuzz::World world(CompilerKind::gcc, "{ \"t.h\" \"src\" { \"app.cpp\" } }\n");
+    ReplaceFile("tree/app/t.h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);
+    ReplaceFile("tree/app/src/app.cpp", "@import \"app/t.h\"\n");
+    world.workspace->CheckFileReferences();
+    world.App().CollectFiles();
+    ProjectBuilder builder(world.settings, world.App(), *world.App().configs.front());
+    builder.GetScannedFile(*builder.FindFile("app/src/app.cpp")).WriteGeneratedFile();
+  });
+  return 0;
+}
