@@ -139,7 +139,7 @@ bool AsFloat(const Literal& value, double& out, bool isExplicit, bool throwOnFai
 
 template <typename T>
 bool AsNarrow(const Literal& value, T& out, bool isExplicit, bool throwOnFailure, std::string_view target) {
-  int64_t wide;
+  int64_t wide = 0;
   if (!AsInt64(value, wide, isExplicit, throwOnFailure)) return false;
   if (!isExplicit && (wide < static_cast<int64_t>(std::numeric_limits<T>::min()) ||
                       wide > static_cast<int64_t>(std::numeric_limits<T>::max()))) {
@@ -156,7 +156,7 @@ bool AsFloat64(const Literal& value, double& out, bool isExplicit, bool throwOnF
 }
 
 bool AsFloat32(const Literal& value, float& out, bool isExplicit, bool throwOnFailure) {
-  double wide;
+  double wide = 0;
   if (!AsFloat(value, wide, isExplicit, throwOnFailure, "float32")) return false;
   out = static_cast<float>(wide);
   return true;
@@ -193,7 +193,7 @@ bool AsUInt32(const Literal& value, uint32_t& out, bool isExplicit, bool throwOn
   return AsNarrow(value, out, isExplicit, throwOnFailure, "uint32");
 }
 bool AsUInt64(const Literal& value, uint64_t& out, bool isExplicit, bool throwOnFailure) {
-  int64_t wide;
+  int64_t wide = 0;
   if (!AsInt64(value, wide, isExplicit, throwOnFailure)) return false;
   out = static_cast<uint64_t>(wide);
   return true;
@@ -336,8 +336,8 @@ Literal ApplyPower(const Literal& left, const Literal& right) {
 }
 
 bool AreEqual(const Literal& left, const Literal& right) {
-  unsigned char c, d;
-  double x, y;
+  unsigned char c = 0, d = 0;
+  double x = 0, y = 0;
   std::string s, t;
   if (BothBool(left, right)) return left.boolean == right.boolean;
   if (BothChar(left, right, c, d)) return c == d;
@@ -348,7 +348,7 @@ bool AreEqual(const Literal& left, const Literal& right) {
 }
 
 bool IsLess(const Literal& left, const Literal& right, bool orEqual) {
-  double x, y;
+  double x = 0, y = 0;
   std::string s, t;
   if (BothString(left, right, s, t)) return orEqual ? s <= t : s < t;
   if (BothInt(left, right)) return orEqual ? left.integer <= right.integer : left.integer < right.integer;
@@ -388,7 +388,7 @@ Literal ApplyBinary(int32_t op, const Literal& left, const Literal& right) {
       break;
   }
   std::string s, t;
-  double x, y;
+  double x = 0, y = 0;
   if (op == kPlus && BothString(left, right, s, t)) return Literal::OfString(s + t);
   if (BothInt(left, right)) return Literal::OfInt(ApplyInt(op, left.integer, right.integer));
   if (HasFloatRule(op) && BothFloat(left, right, x, y)) return Literal::OfFloat(ApplyFloat(op, x, y));
@@ -411,7 +411,7 @@ Literal ApplyUnary(int32_t op, const Literal& value) {
 
 Literal ApplyIndex(const Literal& value, const Literal& index) {
   if (value.kind != Kind::String) Fail("[] not available on " + Name(value));
-  int32_t at;
+  int32_t at = 0;
   AsInt32(index, at, false);
   if (at < 0 || static_cast<size_t>(at) >= value.text.size()) {
     Fail("Index " + std::to_string(at) + " out of range [0," + std::to_string(value.text.size()) + ") on string");

@@ -63,14 +63,14 @@ bool PagedBufferReader::Seek(int64_t position) {
 
 void BufferToOutputStreamAdapter::Write(const void* data, size_t length) {
   if (length > m_room) throw BufferOverflowException();
-  std::memcpy(m_next, data, length);
+  std::copy_n(static_cast<const char*>(data), length, m_next);
   m_next += length;
   m_room -= length;
 }
 
 size_t BufferToInputStreamAdapter::Read(void* data, size_t length) {
   const size_t count = std::min(length, m_length - m_position);
-  std::memcpy(data, m_block + m_position, count);
+  std::copy_n(m_block + m_position, count, static_cast<char*>(data));
   m_position += count;
   return count;
 }

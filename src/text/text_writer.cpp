@@ -1,7 +1,7 @@
 #include "text/text_writer.h"
 
+#include <algorithm>
 #include <charconv>
-#include <cstring>
 #include <ostream>
 #include <streambuf>
 
@@ -24,7 +24,7 @@ class IndentingOutputStreamAsStreambuf : public std::streambuf {
       Empty();
       if (text.size() >= sizeof m_array) return Emit(text);
     }
-    std::memcpy(pptr(), text.data(), text.size());
+    std::copy(text.begin(), text.end(), pptr());  // the text may be null
     pbump(static_cast<int>(text.size()));
   }
 
