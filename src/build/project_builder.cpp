@@ -20,7 +20,11 @@ std::string DependencyFilePath(const Project& project, const ProjectConfig& conf
 }
 
 ProjectBuilder::ProjectBuilder(ConfigSettings& settings, Project& project, ProjectConfig& config)
-    : settings(settings), project(project), config(config) {}
+    : settings(settings),
+      project(project),
+      config(config),
+      m_translationDirectory(TranslationDirectory(config)),
+      m_intermediateDirectory(config.platform + "/" + config.name + "/" + project.name) {}
 
 ProjectBuilder::~ProjectBuilder() = default;
 
@@ -49,11 +53,7 @@ bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path,
 }
 
 std::string ProjectBuilder::TranslatedPath(const ProjectFile& file) const {
-  return PathJoin(TranslationDirectory(config), file.path);
-}
-
-std::string ProjectBuilder::IntermediateDirectory() const {
-  return config.platform + "/" + config.name + "/" + project.name;
+  return PathJoin(m_translationDirectory, file.path);
 }
 
 std::string ProjectBuilder::LibraryDirectory() const {
@@ -133,9 +133,13 @@ bool ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
 }
 
 bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
-  if (LatestTargetTime(*this, file) < LastWriteTime(ObjectPath(*this, file.file))) return true;
+  const std::string object = ObjectPath(*this, file.file);
+  int64_t& objectTime = m_objectTimes[object] = times.LastWriteTime(object);
+  if (LatestTargetTime(*this, file) < objectTime) return true;
   file.WriteGeneratedFile();
-  return file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
+  const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
+  objectTime = times.LastWriteTime(object);
+  return compiled;
 }
 
 void ProjectBuilder::ReportUnregistered() const {
@@ -151,8 +155,12 @@ bool ProjectBuilder::LinkIfStale() {
   const std::string target = TargetPath(*this);
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
+  auto timeOf = [&](const std::string& input) {
+    const auto known = m_objectTimes.find(input);
+    return known == m_objectTimes.end() ? LastWriteTime(input) : known->second;
+  };
   const bool isCurrent = targetTime != 0 && std::none_of(inputs.begin(), inputs.end(), [&](const std::string& input) {
-                           return LastWriteTime(input) > targetTime;
+                           return timeOf(input) > targetTime;
                          });
   if (isCurrent) return true;
   if (!LinkTarget(*this, target, inputs)) return false;

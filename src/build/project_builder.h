@@ -6,8 +6,10 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
+#include "text/files.h"
 #include "translator/scanned_file.h"
 #include "workspace/workspace.h"
 
@@ -39,7 +41,7 @@ class ProjectBuilder : public TranslationHost {
 
   // --- Paths
   std::string TranslatedPath(const ProjectFile& file) const;
-  std::string IntermediateDirectory() const;
+  const std::string& IntermediateDirectory() const { return m_intermediateDirectory; }
   std::string LibraryDirectory() const;
 
   ConfigSettings& settings;
@@ -54,6 +56,7 @@ class ProjectBuilder : public TranslationHost {
 
  public:
   std::map<std::string, std::unique_ptr<ScannedFile>> scannedByPath;
+  FileTimes times;
   bool dependencyFileLoaded = false;
   int64_t errorCount = 0;
   int64_t warningCount = 0;
@@ -69,7 +72,9 @@ class ProjectBuilder : public TranslationHost {
   bool LinkIfStale();
   void Save(const std::string& dependencyFile);
 
+  const std::string m_translationDirectory, m_intermediateDirectory;
   std::map<guid, std::string> m_guidOwners;
+  std::unordered_map<std::string, int64_t> m_objectTimes;  // of the objects that the compile steps have passed
   size_t m_nextFileIndex = 0;
 };
 

@@ -2,26 +2,33 @@
 
 #include <algorithm>
 
-#include "text/files.h"
-
 namespace qrex {
 
 // The cache is set ahead of the imports, so that a cycle in a dependency file ends here.
-int64_t LatestSourceTime(ScannedFile& file) {
+int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file) {
   if (file.latestSourceTime != 0) return file.latestSourceTime;
-  file.latestSourceTime = LastWriteTime(file.SourcePath());
+  file.latestSourceTime = builder.times.LastWriteTime(file.SourcePath());
   if (file.latestSourceTime == 0) return 0;
   for (ScannedFile* import : file.imports) {
-    const int64_t time = LatestSourceTime(*import);
+    const int64_t time = LatestSourceTime(builder, *import);
     if (time == 0) return file.latestSourceTime = 0;
     file.latestSourceTime = std::max(file.latestSourceTime, time);
   }
   return file.latestSourceTime;
 }
 
+namespace {
+
+int64_t TargetTime(ProjectBuilder& builder, ScannedFile& file) {
+  if (file.targetTime == 0) file.targetTime = builder.times.LastWriteTime(builder.TranslatedPath(file));
+  return file.targetTime;
+}
+
+}  // namespace
+
 int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file) {
   if (file.latestTargetTime != 0) return file.latestTargetTime;
-  file.latestTargetTime = LastWriteTime(builder.TranslatedPath(file));
+  file.latestTargetTime = TargetTime(builder, file);
   if (file.latestTargetTime == 0) {
     throw LexScannerException("Error - file not translated by qrex : " + file.file.path, nullptr);
   }
@@ -31,9 +38,9 @@ int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file) {
   return file.latestTargetTime;
 }
 
-bool NeedsTranslation(const ProjectBuilder& builder, ScannedFile& file) {
-  if (LastWriteTime(builder.TranslatedPath(file)) == 0) return true;
-  const int64_t sourceTime = LatestSourceTime(file);
+bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file) {
+  if (TargetTime(builder, file) == 0) return true;
+  const int64_t sourceTime = LatestSourceTime(builder, file);
   return sourceTime == 0 || sourceTime >= file.translationTime;
 }
 

@@ -190,9 +190,10 @@ void WorkspaceRun::MakeDirectories(const Project& project) const {
 }
 
 void WorkspaceRun::CreateMissingFiles(Project& project) const {
+  FileLookup files;
   for (const ProjectFile* file : project.files) {
     const std::string path = project.SourcePath(*file);
-    if (FileExists(path)) continue;
+    if (files.Exists(path)) continue;
     WriteToConsole("Creating missing file " + path + "\n");
     if (!CreateEmptyFile(path, false)) WriteToConsole("Error creating " + path + "\n");
   }

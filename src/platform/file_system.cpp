@@ -66,6 +66,18 @@ bool Stat(const std::string& path, FileInfo& info) {
   return true;
 }
 
+DirectoryTimes::DirectoryTimes(const std::string& directory)
+    : m_descriptor(open(directory.empty() ? "." : directory.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
+
+DirectoryTimes::~DirectoryTimes() {
+  if (IsOpen()) close(m_descriptor);
+}
+
+int64_t DirectoryTimes::WriteTimeOf(const char* name) const {
+  struct stat status;
+  return fstatat(m_descriptor, name, &status, 0) == 0 ? FileTime(status.st_mtim) : 0;
+}
+
 bool CanRead(const std::string& path) {
   FileInfo info;
   return Stat(path, info) && !info.isDirectory && access(path.c_str(), R_OK) == 0;
@@ -93,8 +105,9 @@ bool ReadFile(const std::string& path, std::string& content) {
     const ssize_t got = read(file.Number(), content.data() + size, content.size() - size);
     if (got < 0 && errno == EINTR) continue;
     if (got < 0) return false;
-    if (got == 0) break;
     size += static_cast<size_t>(got);
+    const bool isPlainAndRead = S_ISREG(status.st_mode) && size < content.size();
+    if (got == 0 || isPlainAndRead) break;
   }
   content.resize(size);
   return true;
@@ -171,14 +184,31 @@ bool RealPath(const std::string& path, std::string& out) {
   return !error;
 }
 
-std::vector<std::string> EntryNames(const std::string& directory) {
+namespace {
+
+template <typename Take>
+void ForEachEntry(const std::string& directory, Take take) {
   SetLastError(0);
-  std::vector<std::string> names;
   DIR* handle = opendir(directory.empty() ? "." : directory.c_str());
-  if (!handle) return names;
-  while (const dirent* entry = readdir(handle)) names.emplace_back(entry->d_name);
+  if (!handle) return;
+  while (const dirent* entry = readdir(handle)) take(*entry);
   closedir(handle);
+}
+
+}  // namespace
+
+std::vector<std::string> EntryNames(const std::string& directory) {
+  std::vector<std::string> names;
+  ForEachEntry(directory, [&](const dirent& entry) { names.emplace_back(entry.d_name); });
   std::sort(names.begin(), names.end());
+  return names;
+}
+
+std::vector<std::string> PlainFileNames(const std::string& directory) {
+  std::vector<std::string> names;
+  ForEachEntry(directory, [&](const dirent& entry) {
+    if (entry.d_type == DT_REG) names.emplace_back(entry.d_name);
+  });
   return names;
 }
 

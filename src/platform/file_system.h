@@ -23,6 +23,21 @@ struct FileInfo {
 };
 
 bool Stat(const std::string& path, FileInfo& info);
+
+// The write times of many files of one directory: cheaper than to walk each whole path. 0 for a file that is not there.
+class DirectoryTimes {
+ public:
+  explicit DirectoryTimes(const std::string& directory);
+  ~DirectoryTimes();
+  DirectoryTimes(const DirectoryTimes&) = delete;
+  DirectoryTimes& operator=(const DirectoryTimes&) = delete;
+  bool IsOpen() const { return m_descriptor >= 0; }
+  int64_t WriteTimeOf(const char* name) const;
+
+ private:
+  int m_descriptor;
+};
+
 bool CanRead(const std::string& path);  // a file, not a directory, that opens for reading
 bool IsReadOnlyFile(const std::string& path);
 bool ReadFile(const std::string& path, std::string& content);
@@ -35,7 +50,8 @@ bool SetReadOnlyAttribute(const std::string& path, bool readOnly);
 bool StampNow(const std::string& path);
 bool CopyExecuteBits(const std::string& from, const std::string& to);
 bool FullPath(const std::string& path, std::string& out);
-bool RealPath(const std::string& path, std::string& out);           // with symbolic links resolved
-std::vector<std::string> EntryNames(const std::string& directory);  // "." and ".." included, in byte order
+bool RealPath(const std::string& path, std::string& out);               // with symbolic links resolved
+std::vector<std::string> EntryNames(const std::string& directory);      // "." and ".." included, in byte order
+std::vector<std::string> PlainFileNames(const std::string& directory);  // plain files alone, in no order
 
 }  // namespace qrex::platform

@@ -1,5 +1,6 @@
 #include "platform/system.h"
 
+#include <malloc.h>
 #include <pthread.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -56,8 +57,32 @@ uint64_t PerformanceCounter() {
 
 uint64_t PerformanceFrequency() { return 1000000000; }
 
+namespace {
+
+// The system's own random numbers, many at a time.
+class RandomNumbers {
+ public:
+  using result_type = uint32_t;
+  static constexpr result_type min() { return 0; }
+  static constexpr result_type max() { return UINT32_MAX; }
+  result_type operator()() {
+    if (m_used == m_numbers.size()) {
+      boost::uuids::detail::random_provider().get_random_bytes(m_numbers.data(), sizeof m_numbers);
+      m_used = 0;
+    }
+    return m_numbers[m_used++];
+  }
+
+ private:
+  std::array<result_type, 256> m_numbers;
+  size_t m_used = m_numbers.size();
+};
+
+}  // namespace
+
 std::array<uint8_t, 16> MakeUuid() {
-  static boost::uuids::random_generator generate;
+  static RandomNumbers numbers;
+  static boost::uuids::basic_random_generator<RandomNumbers> generate(numbers);
   const boost::uuids::uuid made = generate();
   std::array<uint8_t, 16> bytes;
   std::copy(made.begin(), made.end(), bytes.begin());
@@ -134,6 +159,9 @@ LocalTime CurrentLocalTime() {
 }
 
 void RunOnStack(size_t bytes, const std::function<void()>& body) {
+  // One arena for all threads, which grows in large steps: a second one would grow page by page.
+  mallopt(M_ARENA_MAX, 1);
+  mallopt(M_TOP_PAD, 4 << 20);
   StackRun run{body, nullptr};
   pthread_attr_t attributes;
   pthread_attr_init(&attributes);

@@ -38,6 +38,17 @@ uint32_t Crc32(std::string_view bytes) {
 }  // namespace
 
 bool FileExists(const std::string& path) { return platform::CanRead(Checked(path)); }
+
+bool FileLookup::Exists(const std::string& path) {
+  const size_t slash = path.rfind('/');
+  const size_t nameBegin = slash == std::string::npos ? 0 : slash + 1;
+  const auto [files, isNew] = m_plainFiles.try_emplace(path.substr(0, nameBegin));
+  if (isNew) {
+    for (std::string& name : platform::PlainFileNames(Checked(files->first))) files->second.insert(std::move(name));
+  }
+  return files->second.contains(path.substr(nameBegin)) || FileExists(path);
+}
+
 bool DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }
 
 bool CopyFile(const std::string& from, const std::string& to, bool failIfExists) {
@@ -80,6 +91,22 @@ bool SetReadOnly(const std::string& path, bool readOnly) {
 int64_t LastWriteTime(const std::string& path) {
   platform::FileInfo info;
   return platform::Stat(Checked(path), info) && !info.isDirectory ? info.writeTime : 0;
+}
+
+FileTimes::FileTimes() = default;
+FileTimes::~FileTimes() = default;
+
+int64_t FileTimes::LastWriteTime(const std::string& path) {
+  const size_t slash = path.rfind('/');
+  const size_t nameBegin = slash == std::string::npos ? 0 : slash + 1;
+  if (m_directories.size() > kMostDirectories) m_directories.clear();
+  auto& directory = m_directories[path.substr(0, nameBegin)];
+  if (!directory) directory = std::make_unique<platform::DirectoryTimes>(Checked(path).substr(0, nameBegin));
+  if (!directory->IsOpen()) {
+    directory.reset();  // it may be made later
+    return qrex::LastWriteTime(path);
+  }
+  return directory->WriteTimeOf(Checked(path).c_str() + nameBegin);
 }
 
 bool TouchFile(const std::string& path, bool create) {

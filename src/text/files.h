@@ -7,19 +7,44 @@
 #include <memory>
 #include <string>
 #include <string_view>
+#include <unordered_map>
+#include <unordered_set>
 
 #include "text/exceptions.h"
 #include "text/streams.h"
 
 namespace qrex {
 
+namespace platform {
+class DirectoryTimes;
+}
+
 bool FileExists(const std::string& path);  // false for a directory and for a file that cannot be opened for reading
+// FileExists for many files of few directories: each directory is listed once.
+class FileLookup {
+ public:
+  bool Exists(const std::string& path);
+
+ private:
+  std::unordered_map<std::string, std::unordered_set<std::string>> m_plainFiles;  // by directory
+};
 bool DeleteFile(const std::string& path);
 bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);  // a program stays executable
 bool CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 bool SetReadOnly(const std::string& path, bool readOnly);
 int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a directory and a missing file
+// The same for many files of few directories, which must stay where they are meanwhile.
+class FileTimes {
+ public:
+  FileTimes();
+  ~FileTimes();
+  int64_t LastWriteTime(const std::string& path);
+
+ private:
+  static constexpr size_t kMostDirectories = 64;  // each takes a descriptor
+  std::unordered_map<std::string, std::unique_ptr<platform::DirectoryTimes>> m_directories;
+};
 bool TouchFile(const std::string& path, bool create);
 bool FullPathOf(const std::string& path, std::string& out);
 bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved

@@ -7,6 +7,7 @@
 #include "lex/sections.h"
 #include "text/paths.h"
 #include "translator/keywords.h"
+#include "translator/predefined_variables.h"
 #include "translator/records.h"
 #include "translator/type_code.h"
 
@@ -293,6 +294,7 @@ void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded)
 }  // namespace
 
 void TranslateFile(ScannedFile& file, IOutputStream& target) {
+  DefinePredefinedVariables(file);
   file.lineTable.clear();
   TextRange expanded;
   try {

@@ -10,7 +10,6 @@
 #include "text/paths.h"
 #include "text/scope_timer.h"
 #include "translator/name_space.h"
-#include "translator/predefined_variables.h"
 #include "translator/qrex_parser.h"
 #include "workspace/workspace.h"
 
@@ -96,7 +95,6 @@ ScannedFile::ScannedFile(TranslationHost& host, ProjectFile& file)
       index(host.NextFileIndex()),
       rootNameSpace(std::make_unique<NameSpace>(*this, nullptr, "")) {
   importsIObject = file.path == kIObjectPath;
-  DefinePredefinedVariables(*this);
 }
 
 ScannedFile::~ScannedFile() = default;
@@ -150,6 +148,7 @@ void ScannedFile::WriteGeneratedFile() {
     needsWriting = false;
     const int64_t readTime = CurrentFileTime();
     if (CopySource(target)) translationTime = readTime;
+    latestTargetTime = targetTime = 0;
   }
 }
 
@@ -184,7 +183,7 @@ void ScannedFile::WriteTranslation(const std::string& target) {
     if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
   }
   needsWriting = false;
-  latestTargetTime = 0;
+  latestTargetTime = targetTime = 0;
   translationTime = readTime;
 }
 

@@ -53,7 +53,7 @@ struct TypeRegistration {
 
 class ScannedFile : public ImportHandler {
  public:
-  ScannedFile(TranslationHost& host, ProjectFile& file);  // adds the predefined variables to `frame`
+  ScannedFile(TranslationHost& host, ProjectFile& file);
   ~ScannedFile() override;
 
   // Translates this file, once per run, and writes the output when `needsWriting` is set (and clears it).
@@ -78,6 +78,7 @@ class ScannedFile : public ImportHandler {
   std::vector<ScannedFile*> imports;  // direct ones, in order
   int64_t latestSourceTime = 0;       // caches, 0 while unknown
   int64_t latestTargetTime = 0;
+  int64_t targetTime = 0;       // of the translated file alone
   int64_t translationTime = 0;  // when the output was last brought up to date
   bool translated = false;
   bool hasDeclarations = false;

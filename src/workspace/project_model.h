@@ -5,6 +5,7 @@
 #include <map>
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "driver/config_settings.h"
@@ -113,8 +114,8 @@ struct Project {
   bool filesCollected = false;
   std::vector<ProjectFolder*> folders;  // subfolders first, the root last
   std::vector<ProjectFile*> files;      // in build order
-  std::map<std::string, ProjectFile*> filesByName;
-  std::map<std::string, std::unique_ptr<ProjectFile>> filesByPath;
+  std::unordered_map<std::string, ProjectFile*> filesByName;
+  std::unordered_map<std::string, std::unique_ptr<ProjectFile>> filesByPath;
   std::string mangledProjDir;
 };
 

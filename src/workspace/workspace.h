@@ -1,9 +1,9 @@
 // All projects of a run: loading, order, identifiers, and the check that no file belongs to two places.
 #pragma once
 
-#include <map>
 #include <memory>
 #include <string>
+#include <unordered_map>
 #include <vector>
 
 #include "workspace/project_model.h"
@@ -28,7 +28,7 @@ class Workspace {
   std::string name;
   std::string rootDir;
   std::string relativeDir;
-  std::map<std::string, ProjectFile*> fileMap;
+  std::unordered_map<std::string, ProjectFile*> fileMap;
 
  private:
   static constexpr int kMaxLoadDepth = 1000;

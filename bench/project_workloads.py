@@ -1,0 +1,116 @@
+"""Workspaces of many projects and files, with the same build described for the peers."""
+
+import os
+
+from workloads import write
+
+CONFIGURATION = """virtualTree = { "tree" }
+$EXPORT_LIB = "out/lib"
+$EXPORT_TRANSLATED_INCLUDE = "out/tinc"
+$EXPORT_UNTRANSLATED_INCLUDE = "out/uinc"
+workspaces = { "all.qrws" }
+config = "Debug"
+platform = "x64"
+mode = %s
+compiler = gcc
+systemName = "Linux"
+PATH("x64") = { "tools" "/usr/bin" "/bin" }
+INCLUDE("x64") = { "include" }
+LIB("x64") = { "lib" }
+"""
+
+PROJECT = """$TARGET_TYPE = "Static Library"
+$ROOT_TO_PROJDIR = "p{number}"
+config {{ "Debug|x64" }}
++cpp {{ -g -Wall }}
+subproj {{ {dependency} }}
+qrex
+{{ "p{number}.h" "src" {{ {files} }} }}
+"""
+
+
+def quoted(texts, separator):
+    return separator.join(f'"{text}"' for text in texts)
+
+
+def workspace(root, mode, projects, files):
+    """A chain of static libraries p0, p1, ..; each source imports the header of its library. Gives the source names."""
+    write(f"{root}/main.qrex", CONFIGURATION % mode)
+    write(f"{root}/tree/.qrwsroot", "")
+    write(f"{root}/tree/all.qrws", f'"all" {{ {quoted([f"p{number}" for number in range(projects)], " ")} }}\n')
+    sources = []
+    for number in range(projects):
+        names = [f"f{number}_{index}.cpp" for index in range(files)]
+        dependency = f'"p{number - 1}"' if number else ""
+        write(f"{root}/tree/p{number}/src/p{number}.qrpj",
+              PROJECT.format(number=number, dependency=dependency, files=quoted(names, " ")))
+        write(f"{root}/tree/p{number}/p{number}.h", f"int p{number}();\n")
+        for index, name in enumerate(names):
+            write(f"{root}/tree/p{number}/src/{name}",
+                  f'@import "p{number}/p{number}.h"\nint f{number}_{index}() {{ return {index}; }}\n')
+        sources.append(names)
+    return sources
+
+
+# --- Generators
+
+GN_TOOLCHAIN = """toolchain("gcc") {
+  tool("cxx") {
+    command = "g++ -c {{cflags}} {{include_dirs}} {{source}} -o {{output}}"
+    outputs = [ "{{source_out_dir}}/{{target_output_name}}.{{source_name_part}}.o" ]
+  }
+  tool("alink") {
+    command = "ar rcs {{output}} {{inputs}}"
+    outputs = [ "{{target_out_dir}}/{{target_output_name}}.a" ]
+  }
+  tool("stamp") { command = "touch {{output}}" }
+}
+"""
+
+
+def generation(root, projects, files):
+    """Project files for one compiler: `Qrex main.qrex`, `gn gen FOLDER`, `premake4 gmake` in root."""
+    sources = workspace(root, "gen", projects, files)
+    targets = quoted([f"//tree/p{number}" for number in range(projects)], ", ")
+    write(f"{root}/.gn", 'buildconfig = "//BUILDCONFIG.gn"\n')
+    write(f"{root}/BUILDCONFIG.gn", 'set_default_toolchain("//:gcc")\n')
+    write(f"{root}/BUILD.gn", GN_TOOLCHAIN + f'group("default") {{ deps = [ {targets} ] }}\n')
+    solution = ['solution "all"\nconfigurations { "Debug" }\n']
+    for number, names in enumerate(sources):
+        paths = [f"src/{name}" for name in names]
+        dependency = f'  deps = [ "//tree/p{number - 1}" ]\n' if number else ""
+        write(f"{root}/tree/p{number}/BUILD.gn",
+              f'static_library("p{number}") {{\n  cflags = [ "-g", "-Wall" ]\n  include_dirs = [ ".", "src", ".." ]\n'
+              f'  sources = [ {quoted(paths, ", ")} ]\n{dependency}}}\n')
+        solution.append(
+            f'project "p{number}"\nkind "StaticLib"\nlanguage "C++"\nflags {{ "Symbols" }}\nbuildoptions {{ "-Wall" }}\n'
+            f'includedirs {{ "tree", "tree/p{number}", "tree/p{number}/src" }}\n'
+            f'files {{ {quoted([f"tree/p{number}/{path}" for path in paths], ", ")} }}\n'
+            + (f'links {{ "p{number - 1}" }}\n' if number else ""))
+    write(f"{root}/premake4.lua", "".join(solution))
+
+
+# --- Builds
+
+# Stands for compiler and archiver: it makes its output, empty.
+TOOL = """#!/bin/sh
+if [ "$1" = rcs ]; then : > "$2"; exit; fi
+read -r text < "${2#@}"
+object=${text##*-o \\"}
+: > "${object%%\\"*}"
+"""
+
+
+def build(root, projects, files):
+    """A build whose tools cost nothing: `Qrex main.qrex` and `ninja` in root."""
+    sources = workspace(root, "build", projects, files)
+    for name in ("gcc-4", "ar"):
+        write(f"{root}/tools/{name}", TOOL)
+        os.chmod(f"{root}/tools/{name}", 0o755)
+    rules = ["rule make\n  command = : > $out\n"]
+    for number, names in enumerate(sources):
+        objects = [f"objects/p{number}/{name}.o" for name in names]
+        rules += [f"build {made}: make tree/p{number}/src/{name} | tree/p{number}/p{number}.h\n"
+                  for made, name in zip(objects, names)]
+        rules.append(f"build objects/p{number}.a: make {' '.join(objects)}\n")
+    write(f"{root}/build.ninja", "".join(rules))
