@@ -115,7 +115,7 @@ struct Project {
   std::vector<ProjectFolder*> folders;  // subfolders first, the root last
   std::vector<ProjectFile*> files;      // in build order
   std::unordered_map<std::string, ProjectFile*> filesByName;
-  std::unordered_map<std::string, std::unique_ptr<ProjectFile>> filesByPath;
+  std::map<std::string, std::unique_ptr<ProjectFile>> filesByPath;
   std::string mangledProjDir;
 };
 
