@@ -64,11 +64,13 @@ std::string VisualLinkerText(const ProjectBuilder& builder, const std::vector<st
   bool hasLtcg = false;
   for (const std::string& token : LinkerTokens(builder.config.linkerText)) {
     if (token.front() != '/') continue;
-    text += " " + ForConfiguration(token, builder.config);
+    text.append(" ").append(ForConfiguration(token, builder.config));
     hasLtcg = hasLtcg || EqualIgnoringCase(token, "/LTCG");
   }
   if (!hasLtcg && HasWholeProgramOptimization(builder.config)) text += " /LTCG";
-  for (const std::string& input : inputs) text += " \"" + ForConfiguration(input, builder.config) + "\"";
+  for (const std::string& input : inputs) {
+    text.append(" \"").append(ForConfiguration(input, builder.config)).append("\"");
+  }
   return text;
 }
 
