@@ -42,10 +42,10 @@ def workspace(root, files):
         write(f"{root}/tree/app/src/{name}", text)
 
 
-def translated(root, name):
-    """The generated text of a source of `app`, with plain line ends."""
-    with open(f"{root}/qrexsource/x64/Debug/app/src/{name}", newline="") as file:
-        return file.read().replace("\r\n", "\n")
+def is_translated(root, name, expected):
+    """Whether the generated text of a source of `app` begins with the content of the file `expected`."""
+    with open(f"{root}/qrexsource/x64/Debug/app/src/{name}", newline="") as file, open(expected, newline="") as wanted:
+        return file.read().replace("\r\n", "\n").startswith(wanted.read())
 
 
 # --- Plain C++

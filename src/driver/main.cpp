@@ -14,6 +14,7 @@ constexpr size_t kStackSize = size_t{1} << 30;
 int main(int argc, char** argv) {
   const std::vector<std::string> arguments(argv, argv + argc);
   int status = 1;
+  qrex::platform::TuneHeap();
   qrex::platform::RunOnStack(kStackSize, [&] { status = qrex::RunCommandLine(arguments); });
   return status;
 }

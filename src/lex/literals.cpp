@@ -104,10 +104,14 @@ bool ReadQuoted(LexScanner& scanner, char quote, std::string_view what) {
   scanner.begin += isRaw ? 2 : 1;
   if (scanner.AtEnd()) Fail(scanner, "Met EOS within " + std::string(what));
   auto soFar = [&] { return std::string(what) + " after reading " + std::string(begin, scanner.begin); };
-  while (*scanner.begin != quote) {
-    if (*scanner.begin == '\n') Fail(scanner, "Met line feed within " + soFar());
-    if (isRaw || !ReadEscape(scanner)) ++scanner.begin;
+  for (;;) {
+    const char* at = scanner.begin;
+    while (at < scanner.end && *at != quote && *at != '\n' && *at != '\\') ++at;
+    scanner.begin = at;
     if (scanner.AtEnd()) Fail(scanner, "Met EOS within " + soFar());
+    if (*at == quote) break;
+    if (*at == '\n') Fail(scanner, "Met line feed within " + soFar());
+    if (isRaw || !ReadEscape(scanner)) ++scanner.begin;
   }
   ++scanner.begin;
   return true;

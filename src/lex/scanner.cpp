@@ -1,6 +1,7 @@
 // The tokeniser. One table tells for each byte which class of token it can begin, so that a token costs one look-up and
-// the walk over its own bytes. The classes and their order are those of the languages: a number, then a quoted string
-// (ahead of identifiers, because of its raw prefix), an identifier, a comment, then operators.
+// the walk over its own bytes; words and single characters are read by NextToken itself. The classes and their order
+// are those of the languages: a number, then a quoted string (ahead of identifiers, because of its raw prefix), an
+// identifier, a comment, then operators.
 
 #include "lex/scanner.h"
 
@@ -12,26 +13,6 @@
 namespace qrex {
 
 namespace {
-
-enum class ByteClass : uint8_t { Bad, Blank, Letter, Digit, Quote, Operator };
-
-constexpr std::array<ByteClass, 256> MakeClasses() {
-  std::array<ByteClass, 256> classes{};
-  classes[' '] = ByteClass::Blank;
-  for (int c = 9; c <= 13; ++c) classes[static_cast<size_t>(c)] = ByteClass::Blank;
-  for (int c = 'a'; c <= 'z'; ++c) classes[static_cast<size_t>(c)] = ByteClass::Letter;
-  for (int c = 'A'; c <= 'Z'; ++c) classes[static_cast<size_t>(c)] = ByteClass::Letter;
-  classes['_'] = ByteClass::Letter;
-  for (int c = '0'; c <= '9'; ++c) classes[static_cast<size_t>(c)] = ByteClass::Digit;
-  classes['"'] = classes['\''] = ByteClass::Quote;
-  for (const char* c = "+<>&|^-*/%!=?:$#.,;(){}[]~@\\`"; *c; ++c) {
-    classes[static_cast<unsigned char>(*c)] = ByteClass::Operator;
-  }
-  return classes;
-}
-constexpr std::array<ByteClass, 256> kClasses = MakeClasses();
-
-ByteClass ClassOf(char c) { return kClasses[static_cast<unsigned char>(c)]; }
 
 // Operators by their first byte: alone, with `=`, doubled, doubled with `=`. kNoToken: no such form.
 struct OperatorForms {
@@ -54,20 +35,7 @@ constexpr OperatorForms kOperators[] = {
     {'?', kQuestion, kQuestionAssign, kNoToken, kNoToken},
     {':', kColon, kNoToken, kColonColon, kColonColon},
     {'$', kDollar, kNoToken, kDollarDollar, kDollarDollar},
-    {'.', kDot, kNoToken, kNoToken, kNoToken},
-    {',', kComma, kNoToken, kNoToken, kNoToken},
-    {';', kSemicolon, kNoToken, kNoToken, kNoToken},
-    {'(', kOpenParen, kNoToken, kNoToken, kNoToken},
-    {')', kCloseParen, kNoToken, kNoToken, kNoToken},
-    {'{', kOpenBrace, kNoToken, kNoToken, kNoToken},
-    {'}', kCloseBrace, kNoToken, kNoToken, kNoToken},
-    {'[', kOpenBracket, kNoToken, kNoToken, kNoToken},
-    {']', kCloseBracket, kNoToken, kNoToken, kNoToken},
-    {'~', kTilde, kNoToken, kNoToken, kNoToken},
     {'@', kAt, kNoToken, kNoToken, kNoToken},
-    {'\\', kBackslash, kNoToken, kNoToken, kNoToken},
-    {'`', kBackquote, kNoToken, kNoToken, kNoToken},
-    {'#', kHash, kNoToken, kNoToken, kNoToken},
 };
 
 constexpr std::array<int8_t, 128> MakeOperatorIndex() {
@@ -125,28 +93,28 @@ bool ScanComment(LexScanner& scanner) {
   return true;
 }
 
-int32_t ScanToken(LexScanner& scanner) {
+}  // namespace
+
+int32_t ScanLongToken(LexScanner& scanner) {
   const char c = *scanner.begin;
-  switch (ClassOf(c)) {
-    case ByteClass::Digit:
+  switch (ByteClassOf(c)) {
+    case kDigitByte:
       return ReadNumber(scanner);
-    case ByteClass::Letter:
-      if ((c == 'r' || c == 'R') && scanner.end - scanner.begin >= 2) {
+    case kLetterByte:
+      if (scanner.end - scanner.begin >= 2) {
         if (scanner.begin[1] == '\'' && ReadQuoted(scanner, '\'', "single quoted string")) return kSingleQuoted;
         if (scanner.begin[1] == '"' && ReadQuoted(scanner, '"', "double quoted string")) return kDoubleQuoted;
       }
-      do {
-        ++scanner.begin;
-      } while (scanner.begin < scanner.end && IsIdentifierPart(*scanner.begin));
+      SkipWord(scanner);
       return kIdentifier;
-    case ByteClass::Quote:
+    case kQuoteByte:
       if (c == '\'') {
         ReadQuoted(scanner, '\'', "single quoted string");
         return kSingleQuoted;
       }
       ReadQuoted(scanner, '"', "double quoted string");
       return kDoubleQuoted;
-    case ByteClass::Operator:
+    case kOperatorByte:
       if (c == '/' && ScanComment(scanner)) return kComment;
       if (c == '@') {
         LexScanner behind = scanner;
@@ -162,32 +130,12 @@ int32_t ScanToken(LexScanner& scanner) {
   }
 }
 
-}  // namespace
-
-LexToken NextToken(LexScanner& scanner, bool keepComments) {
-  LexToken token;
-  do {
-    SkipWhiteSpace(scanner);
-    if (scanner.AtEnd()) {
-      token.kind = kEndOfText;
-      token.text = scanner;
-      return token;
-    }
-    token.text.begin = scanner.begin;
-    token.kind = ScanToken(scanner);
-    token.text.end = scanner.begin;
-  } while (token.kind == kComment && !keepComments);
-  return token;
-}
-
-void SkipWhiteSpace(LexScanner& scanner) {
-  while (scanner.begin < scanner.end && ClassOf(*scanner.begin) == ByteClass::Blank) ++scanner.begin;
-}
-
 bool SkipDigits(LexScanner& scanner) {
   const char* const begin = scanner.begin;
-  while (scanner.begin < scanner.end && ClassOf(*scanner.begin) == ByteClass::Digit) ++scanner.begin;
-  return scanner.begin > begin;
+  const char* at = begin;
+  while (at < scanner.end && ByteClassOf(*at) == kDigitByte) ++at;
+  scanner.begin = at;
+  return at > begin;
 }
 
 int64_t LineOfPosition(const TextRange& text, const char* position) {
@@ -210,9 +158,6 @@ bool SameTokens(LexScanner a, LexScanner b) {
     if (!(tokenA.text == tokenB.text)) return false;
   }
 }
-
-bool IsIdentifierStart(char c) { return ClassOf(c) == ByteClass::Letter; }
-bool IsIdentifierPart(char c) { return ClassOf(c) == ByteClass::Letter || ClassOf(c) == ByteClass::Digit; }
 
 void ParserBase::SetInput(const TextRange& text) {
   scanner = LexScanner(text);

@@ -103,6 +103,37 @@ enum TokenKind : int32_t {
   kHash,
 };
 
+constexpr int32_t SingleToken(char c) {  // of the characters that are always a token of their own
+  switch (c) {
+    case '.':
+      return kDot;
+    case ',':
+      return kComma;
+    case ';':
+      return kSemicolon;
+    case '(':
+      return kOpenParen;
+    case ')':
+      return kCloseParen;
+    case '{':
+      return kOpenBrace;
+    case '}':
+      return kCloseBrace;
+    case '[':
+      return kOpenBracket;
+    case ']':
+      return kCloseBracket;
+    case '~':
+      return kTilde;
+    case '\\':
+      return kBackslash;
+    case '`':
+      return kBackquote;
+    default:
+      return kHash;
+  }
+}
+
 struct LexToken {
   int32_t kind = kNoToken;
   TextRange text;  // exact source text, quotes and raw prefix included

@@ -6,8 +6,6 @@
 
 namespace qrex {
 
-int64_t maxIterations = 1000000;
-
 namespace {
 
 // On a copy of the scanner: `@` and the word, with comments and line ends between at will.
@@ -68,9 +66,10 @@ void ExpansionContext::While() {
   int indent;
   const TextRange block = ReadBlockOf(m_scanner, "@while", indent);
   DropToScanner();
-  const int64_t column = CurrentColumn();
+  const LineIndent column = CurrentColumn();
   for (int64_t i = 0; EvaluateCondition(condition, "@while"); ++i) {
-    if (i == maxIterations) throw LexScannerException("Too many iterations in @while directive", m_tokenText);
+    if (i == expansionLimits.iterations)
+      throw LexScannerException("Too many iterations in @while directive", m_tokenText);
     LSFrame child(&m_frame);
     ExpandBlock(block, child, indent, column);
   }
@@ -120,7 +119,7 @@ struct ExpansionContext::Loop {
   std::string elements;  // the list, expanded
   TextRange block;
   int indent = 0;
-  int64_t column = 0;
+  LineIndent column;
 };
 
 ExpansionContext::Loop ExpansionContext::ReadLoopHead() {

@@ -98,7 +98,7 @@ void ExpansionContext::Str(bool wide, bool breakLines) {
   const TextRange raw = ReadParenBlock(m_scanner, indent);
   DropToScanner();
   const std::string text = ExpandPart(raw, indent);
-  const int64_t savedIndent = m_outIndent;
+  const LineIndent savedIndent = m_outIndent;
   m_outIndent = CurrentColumn();
   const std::string opening = wide ? "L\"" : "\"";
   std::string literal = opening;
@@ -129,7 +129,7 @@ void ExpansionContext::Unstr() {
     PatchExpressionError(exception, "@unstr(", expansion, ")", m_tokenText.begin);
     throw;
   }
-  const int64_t savedIndent = m_outIndent;
+  const LineIndent savedIndent = m_outIndent;
   m_outIndent = CurrentColumn();
   EmitGenerated(text);
   m_outIndent = savedIndent;
@@ -139,7 +139,7 @@ void ExpansionContext::Quote() {
   int indent;
   const TextRange raw = ReadParenBlock(m_scanner, indent);
   DropToScanner();
-  const int64_t column = CurrentColumn();
+  const LineIndent column = CurrentColumn();
   LexScanner behind = m_scanner;
   m_scanner = LexScanner(raw);
   while (!m_scanner.AtEnd()) {

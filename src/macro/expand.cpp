@@ -11,6 +11,7 @@ namespace qrex {
 namespace {
 
 constexpr int kMaxNesting = 1000;
+constexpr size_t kLargeText = 1u << 20;
 int nesting = 0;
 int64_t parts = 0;  // of the text at nesting 0
 
@@ -27,7 +28,7 @@ void ForgetPosition(LexScannerException& exception, const std::string& text) {
 }
 
 ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
-                                   int64_t outIndent, ExpansionSink& sink, const TextRange* anchor)
+                                   LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor)
     : m_handler(handler),
       m_frame(frame),
       m_sink(sink),
@@ -49,24 +50,42 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
 ExpansionContext::~ExpansionContext() { --nesting; }
 
 void ExpansionContext::Run() {
+  RunToEnd();
+  FlushTo(m_scanner.begin);
+}
+
+bool ExpansionContext::RunUnlessPlain() {
+  RunToEnd();
+  if (m_pendingBegin == m_text.begin && m_outIndent.IsNone() && m_sink.output.empty()) {
+    m_sink.map.AddVerbatim(m_text.begin, m_text.end);
+    return false;
+  }
+  FlushTo(m_scanner.begin);
+  return true;
+}
+
+void ExpansionContext::RunToEnd() {
   for (;;) {
-    SkipToToken();
-    const LexToken token = NextToken(m_scanner, true);
-    m_tokenText = token.text;
+    m_here = m_scanner.begin;
+    if (m_here < m_scanner.end && IsBlankByte(*m_here)) SkipToToken();
+    LexToken token;
+    ReadToken(m_scanner, token, true);
     switch (token.kind) {
       case kEndOfText:
-        return FlushTo(m_scanner.begin);
+        return;
       case kIdentifier:
-        ExpandIdentifier(token);
+        if (NamesInUse::MayHold(token.text.View())) ExpandIdentifier(token);
         break;
       case kDoubleQuoted:
         SubstituteInString(token);
         break;
       case kMacroComment:
+        m_tokenText = token.text;
         Settle();
         SwallowLine();
         break;
       case kAt:
+        m_tokenText = token.text;
         ExpandAt();
         break;
       default:
@@ -78,23 +97,24 @@ void ExpansionContext::Run() {
 
 // To the begin of the next token, which `m_here` keeps. Every line but the first loses up to `m_stripIndent` columns.
 void ExpansionContext::SkipToToken() {
-  for (; !m_scanner.AtEnd(); ++m_scanner.begin) {
-    const char c = *m_scanner.begin;
-    if (c == ' ' || c == '\t') continue;
-    if (c != '\n') break;
-    m_settled = m_scanner.begin + 1;
+  const char* at = m_scanner.begin;
+  for (; at < m_scanner.end; ++at) {
+    if (*at == ' ' || *at == '\t') continue;
+    if (*at != '\n') break;
+    m_settled = at + 1;
     if (m_stripIndent > 0) {
-      ++m_scanner.begin;
+      m_scanner.begin = m_settled;
       Settle();
       StripIndentation(m_stripIndent);
       DropToScanner();
-      --m_scanner.begin;
+      at = m_scanner.begin - 1;
     }
   }
-  m_here = m_scanner.begin;
+  m_here = m_scanner.begin = at;
 }
 
 void ExpansionContext::ExpandIdentifier(const LexToken& token) {
+  m_tokenText = token.text;
   LSVariable* variable = m_frame.Find(token.text.View(), token.text.begin);
   if (!variable) return;
   FlushTo(m_here);
@@ -104,6 +124,7 @@ void ExpansionContext::ExpandIdentifier(const LexToken& token) {
 void ExpansionContext::SubstituteInString(const LexToken& token) {
   const LSFileFrame* fileFrame = m_frame.FileFrame();
   if (!fileFrame || token.text.View().find("$(") == std::string_view::npos) return;
+  m_tokenText = token.text;
   std::string text = token.text.Text();
   try {
     if (!fileFrame->Substitute(text)) return;
@@ -169,9 +190,9 @@ void ExpansionContext::FlushTo(const char* position) {
   m_pendingBegin = position;
 }
 
-void ExpansionContext::CopySource(const TextRange& text, int64_t indent) {
+void ExpansionContext::CopySource(const TextRange& text, LineIndent indent) {
   if (m_anchor) {
-    m_sink.WriteGenerated(text.View(), *m_anchor, indent);
+    m_sink.WriteGenerated(text.View(), m_anchor->begin, indent);
   } else {
     m_sink.WriteVerbatim(text, indent);
   }
@@ -187,7 +208,7 @@ void ExpansionContext::CheckLength(size_t added) const {
 
 void ExpansionContext::EmitGenerated(std::string_view text) {
   CheckLength(text.size());
-  m_sink.WriteGenerated(text, *AnchorForTemporary(), m_outIndent);
+  m_sink.WriteGenerated(text, AnchorForTemporary()->begin, m_outIndent);
 }
 
 void ExpansionContext::StripIndentation(int64_t width) {
@@ -217,7 +238,7 @@ void ExpansionContext::SwallowLine() {
 
 // --- Expansion of parts
 
-void ExpansionContext::ExpandBlock(const TextRange& block, LSFrame& frame, int indent, int64_t column) {
+void ExpansionContext::ExpandBlock(const TextRange& block, LSFrame& frame, int indent, LineIndent column) {
   if (block.Empty()) return;
   ExpansionContext(nullptr, frame, block, indent, column, m_sink, m_anchor).Run();
 }
@@ -259,6 +280,13 @@ std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRan
 
 std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
                                   int64_t outIndent, SourceMap& map) {
+  std::string result;
+  const TextRange expanded = ExpandWithMap(handler, frame, text, stripIndent, outIndent, result, map);
+  return result.empty() ? expanded.Text() : result;
+}
+
+TextRange ExpandWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                        int64_t outIndent, std::string& storage, SourceMap& map) {
   // A file counts afresh: a chain of imports may be longer than the nesting of macros.
   struct Restore {
     int value;
@@ -266,10 +294,11 @@ std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const 
   } restore{nesting};
   if (handler) nesting = 0;
   ExpansionSink sink;
-  sink.output.reserve(text.Size());
-  ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).Run();
+  sink.expectedSize = text.Size() + text.Size() / (text.Size() < kLargeText ? 4 : 1);
+  const bool changed = ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).RunUnlessPlain();
   map = std::move(sink.map);
-  return std::move(sink.output);
+  storage = std::move(sink.output);
+  return changed ? TextRange(std::string_view(storage)) : text;
 }
 
 namespace {

@@ -20,6 +20,7 @@ class ImportHandler {
 struct ExpansionLimits {
   int64_t parts = 100'000'000;  // bodies, blocks, arguments and conditions
   int64_t bytes = int64_t{1} << 30;
+  int64_t iterations = 1'000'000;  // of one @while
 };
 extern ExpansionLimits expansionLimits;
 
@@ -27,9 +28,12 @@ void Expand(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64
             ExpansionSink& sink);
 std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent = 0,
                            int64_t outIndent = 0);
-// The entry for whole files.
+// The entries for whole files. The second doesn't copy a text in which nothing is to be changed: the answer is `text`
+// itself then, else what it put into `storage`.
 std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
                                   int64_t outIndent, SourceMap& map);
+TextRange ExpandWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
+                        int64_t outIndent, std::string& storage, SourceMap& map);
 std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type);
 
 }  // namespace qrex

@@ -5,6 +5,7 @@
 // due for the output and goes there in one run, when something other is to be written or dropped.
 #pragma once
 
+#include <boost/container/small_vector.hpp>
 #include <memory>
 #include <string>
 
@@ -19,16 +20,18 @@ class ExpansionContext {
   // `anchor`: for a text composed on the way, the source that stands for it in the map (it may end before the map and
   // before a macro that it defines). Null for source text.
   ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
-                   int64_t outIndent, ExpansionSink& sink, const TextRange* anchor);
+                   LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor);
   ~ExpansionContext();
   ExpansionContext(const ExpansionContext&) = delete;
   ExpansionContext& operator=(const ExpansionContext&) = delete;
   void Run();
+  bool RunUnlessPlain();  // false: nothing in the text is to be changed, and nothing was written but the map
 
  private:
   friend struct Directive;
 
   // --- Loop
+  void RunToEnd();
   void SkipToToken();
   void ExpandIdentifier(const LexToken& token);
   void SubstituteInString(const LexToken& token);
@@ -42,15 +45,15 @@ class ExpansionContext {
   void DropToScanner() { DropTo(m_scanner.begin); }
   void EmitGenerated(std::string_view text);
   void CheckLength(size_t added) const;
-  int64_t CurrentColumn() const { return m_sink.column < 0 ? m_outIndent : m_sink.column; }
+  LineIndent CurrentColumn() const { return m_sink.AtLineStart() ? m_outIndent : m_sink.ColumnHere(); }
   const TextRange* AnchorForTemporary() const { return m_anchor ? m_anchor : &m_tokenText; }
   void StripIndentation(int64_t width);
   void SwallowLine();
 
   // --- Expansion of parts of the text
-  void ExpandBlock(const TextRange& block, LSFrame& frame, int indent, int64_t column);
+  void ExpandBlock(const TextRange& block, LSFrame& frame, int indent, LineIndent column);
   std::string ExpandPart(const TextRange& part, int64_t stripIndent = 0);  // in a child frame
-  void CopySource(const TextRange& text, int64_t indent);                  // to the sink, as it stands
+  void CopySource(const TextRange& text, LineIndent indent);               // to the sink, as it stands
   LexToken Next() { return NextToken(m_scanner); }
   LexToken RequireIdentifier(std::string_view message);  // fails with the message and the token
   [[noreturn]] void FailAt(const LexToken& token, std::string message) const;
@@ -107,7 +110,8 @@ class ExpansionContext {
   void CallVariable(LSVariable& variable);
   void CallMacro(const LSMacroVariable& macro);
   void CallFunctionArgument(const LSMacroVariable& macro);
-  std::vector<BoundArgument> ReadArguments(const LSMacroVariable& macro);
+  using BoundArguments = boost::container::small_vector<BoundArgument, 6>;
+  BoundArguments ReadArguments(const LSMacroVariable& macro);
   void BindArgument(LSFrame& frame, const BoundArgument& argument, const LSMacroVariable& macro);
   void RunBody(const LSMacroVariable& macro, LSFrame& frame);
 
@@ -121,7 +125,7 @@ class ExpansionContext {
   LSFrame& m_frame;
   ExpansionSink& m_sink;
   const int64_t m_stripIndent;
-  int64_t m_outIndent;
+  LineIndent m_outIndent;
   const TextRange m_text;
   const TextRange* const m_anchor;
   LexScanner m_scanner;
@@ -130,8 +134,6 @@ class ExpansionContext {
   const char* m_pendingBegin;
   const char* m_settled;
 };
-
-extern int64_t maxIterations;  // of one @while
 
 // Expansion into a string of its own; no map is kept.
 std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor);

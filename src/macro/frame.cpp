@@ -73,16 +73,32 @@ LSFrame::~LSFrame() = default;
 
 void LSFrame::AddVariable(std::unique_ptr<LSVariable> variable) {
   LSVariable& added = *variable;
+  const bool replaces = FindLocal(added.name.View()) != nullptr;
   m_variables.push_back(std::move(variable));
-  const bool replaces = m_names.erase(added.name.View()) != 0;  // the key must refer to the text of the newest
-  m_names.emplace(added.name.View(), &added);
+  NamesInUse::Add(added.name.View());
+  if (m_names) {
+    EnterInIndex(added);
+  } else if (m_variables.size() > kMostWithoutIndex) {
+    m_names = std::make_unique<Index>();
+    for (const auto& each : m_variables) EnterInIndex(*each);
+  }
   OnAdded(added, replaces);
 }
 
+void LSFrame::EnterInIndex(LSVariable& variable) {
+  m_names->erase(variable.name.View());  // the key must refer to the text of the newest
+  m_names->emplace(variable.name.View(), &variable);
+}
+
 LSVariable* LSFrame::FindLocal(std::string_view name) const {
-  if (m_names.empty()) return nullptr;
-  auto found = m_names.find(name);
-  return found == m_names.end() ? nullptr : found->second;
+  if (m_names) {
+    auto found = m_names->find(name);
+    return found == m_names->end() ? nullptr : found->second;
+  }
+  for (size_t i = m_variables.size(); i-- > 0;) {
+    if (m_variables[i]->name == name) return m_variables[i].get();
+  }
+  return nullptr;
 }
 
 LSVariable* LSFrame::FindInChain(std::string_view name) const {
@@ -181,8 +197,8 @@ constexpr size_t kMaxSubstituted = 64u << 20;
 LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(NextFrameIndex()) { m_fileFrame = this; }
 
 LSFileFrame::~LSFileFrame() {
-  for (const auto& [name, variable] : m_names) {
-    if (!IsPredefined(name)) Definitions().Remove(name, m_index);
+  for (const auto& variable : m_variables) {
+    if (!IsPredefined(variable->name.View())) Definitions().Remove(variable->name.View(), m_index);
   }
 }
 

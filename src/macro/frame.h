@@ -1,6 +1,7 @@
 // Variables, macros and the frames that scope them, and the $(name) substitutions of double-quoted strings.
 #pragma once
 
+#include <boost/container/small_vector.hpp>
 #include <cstdint>
 #include <map>
 #include <memory>
@@ -85,7 +86,36 @@ class LSVar : public LSValueVariable {
   const std::string ownName;
 };
 
-// A scope of names. Child frames come and go with every body and expression, so one without definitions owns nothing.
+// Which names stand in any frame of the process, roughly: the lengths that begin with each byte, and a bit for some
+// more of a name's bytes. Most words of a text are no names, and are told so without a look into the frames.
+class NamesInUse {
+ public:
+  static bool MayHold(std::string_view name) {
+    if ((m_lengths[FirstOf(name)] >> (name.size() % 64) & 1) == 0) return false;
+    const size_t bit = BitOf(name);
+    return (m_bits[bit / 64] >> (bit % 64) & 1) != 0;
+  }
+  static void Add(std::string_view name) {
+    m_lengths[FirstOf(name)] |= uint64_t{1} << (name.size() % 64);
+    const size_t bit = BitOf(name);
+    m_bits[bit / 64] |= uint64_t{1} << (bit % 64);
+  }
+
+ private:
+  static constexpr size_t kBits = 16384;
+  static unsigned char ByteOf(std::string_view name, size_t at) { return static_cast<unsigned char>(name[at]); }
+  static unsigned char FirstOf(std::string_view name) { return name.empty() ? 0 : ByteOf(name, 0); }
+  static size_t BitOf(std::string_view name) {
+    if (name.empty()) return 0;
+    const size_t last = name.size() - 1;
+    return ((ByteOf(name, 0) * size_t{31} + ByteOf(name, last)) * 31 + ByteOf(name, last / 2) * 7 + last) % kBits;
+  }
+  static inline uint64_t m_lengths[256];
+  static inline uint64_t m_bits[kBits / 64];
+};
+
+// A scope of names. Child frames come and go with every body and expression, so one without definitions owns nothing,
+// and one with a few is searched without an index.
 class LSFrame {
  public:
   explicit LSFrame(LSFrame* parent);
@@ -104,10 +134,14 @@ class LSFrame {
   LSFileFrame* FileFrame() const { return m_fileFrame; }
 
  protected:
-  virtual void OnAdded(LSVariable&, bool) {}
+  virtual void OnAdded(LSVariable&, bool /*replaces*/) {}
+  void EnterInIndex(LSVariable& variable);
 
-  std::vector<std::unique_ptr<LSVariable>> m_variables;       // oldest first
-  std::unordered_map<std::string_view, LSVariable*> m_names;  // the newest of each name
+  using Index = std::unordered_map<std::string_view, LSVariable*>;
+  static constexpr size_t kMostWithoutIndex = 8;
+
+  boost::container::small_vector<std::unique_ptr<LSVariable>, 4> m_variables;  // oldest first
+  std::unique_ptr<Index> m_names;                                              // the newest of each name; or null
   LSFrame* m_parent;
   LSFileFrame* m_fileFrame;
 };

@@ -324,7 +324,7 @@ double ApplyFloat(int32_t op, double a, double b) {
 }
 
 Literal ApplyPower(const Literal& left, const Literal& right) {
-  double base, exponent;
+  double base = 0, exponent = 0;
   if (!BothFloat(left, right, base, exponent)) FailTypes(kXorXor, left, right);
   if (base == 0 && exponent < 0) {
     MemoryTextWriter text;
@@ -357,7 +357,7 @@ bool IsLess(const Literal& left, const Literal& right, bool orEqual) {
 }
 
 Literal ApplyLogical(int32_t op, const Literal& left, const Literal& right) {
-  bool value;
+  bool value = false;
   AsBool(left, value, false);
   if (value == (op == kAndAnd)) AsBool(right, value, false);
   return Literal::OfBool(value);
@@ -397,7 +397,7 @@ Literal ApplyBinary(int32_t op, const Literal& left, const Literal& right) {
 
 Literal ApplyUnary(int32_t op, const Literal& value) {
   if (op == kNot) {
-    bool boolean;
+    bool boolean = false;
     AsBool(value, boolean, false);
     return Literal::OfBool(!boolean);
   }

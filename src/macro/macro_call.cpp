@@ -18,8 +18,8 @@ void ExpansionContext::CallVariable(LSVariable& variable) {
   CallMacro(macro);
 }
 
-std::vector<ExpansionContext::BoundArgument> ExpansionContext::ReadArguments(const LSMacroVariable& macro) {
-  std::vector<BoundArgument> arguments;
+ExpansionContext::BoundArguments ExpansionContext::ReadArguments(const LSMacroVariable& macro) {
+  BoundArguments arguments;
   if (macro.formals.empty()) return arguments;
   const LexToken open = Next();
   if (open.kind != kOpenParen) {
@@ -66,7 +66,7 @@ void ExpansionContext::BindArgument(LSFrame& frame, const BoundArgument& argumen
 }
 
 void ExpansionContext::CallMacro(const LSMacroVariable& macro) {
-  const std::vector<BoundArgument> arguments = ReadArguments(macro);
+  const BoundArguments arguments = ReadArguments(macro);
   DropToScanner();
   LSFrame callFrame(macro.homeFrame ? macro.homeFrame : &m_frame);
   LSFrame& frame = macro.isNaked ? m_frame : callFrame;

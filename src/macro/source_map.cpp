@@ -2,17 +2,19 @@
 
 #include <algorithm>
 #include <cstring>
+#include <utility>
 
 #include "lex/scanner.h"
 #include "lex/sections.h"
 #include "macro/mpfw_parser.h"
+#include "platform/file_system.h"
 
 namespace qrex {
 
 namespace {
 
 const char* MapInRun(const SourceMapRun& run, int64_t offsetInRun) {
-  return run.generatedLength ? run.sourceBegin : run.sourceBegin + offsetInRun;
+  return run.IsGenerated() ? run.SourceBegin() : run.SourceBegin() + offsetInRun;
 }
 
 [[noreturn]] void FailBeyondEnd() { throw ExceptionBase("INTERNAL ERROR: offset lies beyond the source map"); }
@@ -24,14 +26,51 @@ const char* MapOutputOffset(const SourceMap& map, int64_t offset) {
   return cursor.Map(offset);
 }
 
-const char* MapCursor::Map(int64_t offset) {
-  for (; m_run < m_map->size(); ++m_run) {
-    const SourceMapRun& run = (*m_map)[m_run];
-    const int64_t length = run.OutputLength();
-    if (offset < m_runBegin + length) return MapInRun(run, offset - m_runBegin);
-    m_runBegin += length;
+void SourceMap::Add(const char* source, size_t length, bool isGenerated) {
+  if (m_next == m_pageEnd) {
+    const size_t size = PageSize(m_pages.size());
+    m_pages.emplace_back(new SourceMapRun[size]);  // not zeroed
+    m_next = m_pages.back().get();
+    m_pageEnd = m_next + size;
+    platform::PreferLargePages(m_next, size * sizeof(SourceMapRun));
   }
-  FailBeyondEnd();
+  *m_next++ = SourceMapRun(source, length, isGenerated);
+}
+
+void SourceMap::AddVerbatim(const char* begin, const char* end) {
+  if (begin == end) return;
+  if (begin == m_verbatimEnd) {
+    SourceMapRun& last = m_next[-1];
+    const size_t more = std::min(static_cast<size_t>(end - begin), SourceMapRun::kMostLength - last.Length());
+    last.Lengthen(more);
+    begin += more;
+  }
+  for (size_t length; begin < end; begin += length) {
+    length = std::min(static_cast<size_t>(end - begin), SourceMapRun::kMostLength);
+    Add(begin, length, false);
+  }
+  m_verbatimEnd = end;
+}
+
+void SourceMap::AddGenerated(const char* source, size_t length) {
+  m_verbatimEnd = nullptr;
+  for (; length > SourceMapRun::kMostLength; length -= SourceMapRun::kMostLength) {
+    Add(source, SourceMapRun::kMostLength, true);
+  }
+  Add(source, length, true);
+}
+
+const char* MapCursor::Map(int64_t offset) {
+  for (;;) {
+    for (; m_run != m_pageEnd; ++m_run) {
+      const int64_t length = static_cast<int64_t>(m_run->Length());
+      if (offset < m_runBegin + length) return MapInRun(*m_run, offset - m_runBegin);
+      m_runBegin += length;
+    }
+    if (m_nextPage == m_map->PageCount()) FailBeyondEnd();
+    m_run = m_map->PageBegin(m_nextPage);
+    m_pageEnd = m_map->PageEnd(m_nextPage++);
+  }
 }
 
 void MapErrorPosition(const SourceMap& map, const TextRange& output, LexScannerException& exception) {
@@ -60,52 +99,59 @@ void ReportParseError(const SourceFileList& files, TextWriter& writer, const Lex
   writer << exception.message << "\n";
 }
 
-// Text goes out line by line: only a line's begin may need blanks ahead of it.
-void ExpansionSink::WriteVerbatim(const TextRange& range, int64_t indent) {
-  const char* runBegin = range.begin;
-  auto closeRun = [&](const char* end) {
-    if (runBegin == end) return;
-    output.append(runBegin, end);
-    if (!map.empty() && map.back().generatedLength == 0 && map.back().sourceEnd == runBegin) {
-      map.back().sourceEnd = end;
-    } else {
-      map.push_back({runBegin, end, 0});
-    }
-    runBegin = end;
-  };
-  for (const char* at = range.begin; at < range.end;) {
-    if (column < 0) {
-      if (indent > 0) {
-        closeRun(at);
-        output.append(static_cast<size_t>(indent), ' ');
-        map.push_back({nullptr, nullptr, indent});
-      }
-      column = std::max<int64_t>(indent, 0);
-    }
-    const void* lineFeed = std::memchr(at, '\n', static_cast<size_t>(range.end - at));
-    const char* const end = lineFeed ? static_cast<const char*>(lineFeed) : range.end;
-    column += (end - at) + (kTabWidth - 1) * std::count(at, end, '\t');
-    at = end;
-    if (lineFeed) {
-      column = -1;
-      ++at;
-    }
-  }
-  closeRun(range.end);
+void ExpansionSink::MakeRoom() {
+  if (expectedSize > 0) platform::ReserveText(output, std::exchange(expectedSize, 0));
 }
 
-void ExpansionSink::WriteGenerated(std::string_view text, const TextRange& source, int64_t indent) {
-  if (text.empty()) return;
-  const size_t before = output.size();
-  for (char c : text) {
-    if (column < 0) {
-      if (indent > 0) output.append(static_cast<size_t>(indent), ' ');
-      column = std::max<int64_t>(indent, 0);
+void ExpansionSink::AddVerbatim(const char* begin, const char* end) {
+  if (begin == end) return;
+  MakeRoom();
+  output.append(begin, end);
+  map.AddVerbatim(begin, end);
+}
+
+// Only a line's begin may need blanks ahead of it.
+bool ExpansionSink::BeginsLine(std::string_view text) const {
+  return AtLineStart() || std::memchr(text.data(), '\n', text.size()) != nullptr;
+}
+
+void ExpansionSink::WriteVerbatim(const TextRange& range, LineIndent indent) {
+  if (indent.IsNone() || range.Empty() || !BeginsLine(range.View())) return AddVerbatim(range.begin, range.end);
+  const size_t columns = indent.ColumnsIn(output);
+  for (const char* line = range.begin; line < range.end;) {
+    if (AtLineStart() && columns > 0) {
+      MakeRoom();
+      output.append(columns, ' ');
+      map.AddGenerated(nullptr, columns);
     }
-    output += c;
-    column = c == '\n' ? -1 : column + (c == '\t' ? kTabWidth : 1);
+    const void* lineFeed = std::memchr(line, '\n', static_cast<size_t>(range.end - line));
+    const char* const end = lineFeed ? static_cast<const char*>(lineFeed) + 1 : range.end;
+    AddVerbatim(line, end);
+    line = end;
   }
-  map.push_back({source.begin, source.end, static_cast<int64_t>(output.size() - before)});
+}
+
+void ExpansionSink::WriteGenerated(std::string_view text, const char* source, LineIndent indent) {
+  if (text.empty()) return;
+  MakeRoom();
+  const size_t before = output.size();
+  const size_t columns = !indent.IsNone() && BeginsLine(text) ? indent.ColumnsIn(output) : 0;
+  while (columns > 0 && !text.empty()) {
+    if (AtLineStart()) output.append(columns, ' ');
+    const size_t lineFeed = text.find('\n');
+    const size_t length = lineFeed == std::string_view::npos ? text.size() : lineFeed + 1;
+    output.append(text.substr(0, length));
+    text.remove_prefix(length);
+  }
+  output.append(text);
+  map.AddGenerated(source, output.size() - before);
+}
+
+size_t LineIndent::ColumnsIn(std::string_view output) const {
+  if (m_value >= 0) return static_cast<size_t>(m_value);
+  const std::string_view before = output.substr(0, static_cast<size_t>(~m_value));
+  const std::string_view line = before.substr(before.rfind('\n') + 1);
+  return line.size() + (kTabWidth - 1) * static_cast<size_t>(std::count(line.begin(), line.end(), '\t'));
 }
 
 }  // namespace qrex

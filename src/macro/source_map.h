@@ -2,7 +2,6 @@
 #pragma once
 
 #include <cstdint>
-#include <list>
 #include <memory>
 #include <string>
 #include <vector>
@@ -11,16 +10,46 @@
 
 namespace qrex {
 
-// One stretch of the output. generatedLength 0: a verbatim copy of the source range. Above 0 with positions: all of it
-// maps to sourceBegin. Above 0 with null positions: blanks of indentation. Runs cover the output in order without gaps;
-// adjacent verbatim runs of adjacent source are one run.
-struct SourceMapRun {
-  const char* sourceBegin = nullptr;
-  const char* sourceEnd = nullptr;
-  int64_t generatedLength = 0;
-  int64_t OutputLength() const { return generatedLength ? generatedLength : sourceEnd - sourceBegin; }
+// One stretch of the output. Verbatim: a copy of the source from its begin on. Generated: all of it maps to the begin;
+// null: blanks of indentation. There are several for each macro call, so a run is as small as it can be (addresses have
+// 48 bits), and a longer stretch is several runs.
+class SourceMapRun {
+ public:
+  static constexpr size_t kMostLength = (1 << 15) - 1;
+  SourceMapRun() = default;
+  SourceMapRun(const char* source, size_t length, bool isGenerated)
+      : m_bits(reinterpret_cast<uintptr_t>(source) | static_cast<uint64_t>(length) << kAddressBits |
+               static_cast<uint64_t>(isGenerated) << 63) {}
+  const char* SourceBegin() const { return reinterpret_cast<const char*>(static_cast<uintptr_t>(m_bits & kAddress)); }
+  size_t Length() const { return m_bits >> kAddressBits & kMostLength; }
+  bool IsGenerated() const { return m_bits >> 63 != 0; }
+  void Lengthen(size_t more) { m_bits += static_cast<uint64_t>(more) << kAddressBits; }
+
+ private:
+  static constexpr int kAddressBits = 48;
+  static constexpr uint64_t kAddress = (uint64_t{1} << kAddressBits) - 1;
+  uint64_t m_bits;
 };
-using SourceMap = std::vector<SourceMapRun>;
+
+// The runs cover the output in order without gaps. They are never moved: a page holds twice as many as the one before.
+class SourceMap {
+ public:
+  void AddVerbatim(const char* begin, const char* end);  // one run with the one before when their sources are adjacent
+  void AddGenerated(const char* source, size_t length);
+  size_t PageCount() const { return m_pages.size(); }
+  const SourceMapRun* PageBegin(size_t page) const { return m_pages[page].get(); }
+  const SourceMapRun* PageEnd(size_t page) const {
+    return page + 1 == PageCount() ? m_next : PageBegin(page) + PageSize(page);
+  }
+
+ private:
+  static size_t PageSize(size_t page) { return size_t{64} << page; }
+  void Add(const char* source, size_t length, bool isGenerated);
+  std::vector<std::unique_ptr<SourceMapRun[]>> m_pages;
+  SourceMapRun* m_next = nullptr;
+  SourceMapRun* m_pageEnd = nullptr;
+  const char* m_verbatimEnd = nullptr;  // of the last run; null when it is a generated one
+};
 
 const char* MapOutputOffset(const SourceMap& map,
                             int64_t offset);  // linear: for errors. Throws ExceptionBase past the end
@@ -33,7 +62,9 @@ class MapCursor {
 
  private:
   const SourceMap* m_map;
-  size_t m_run = 0;
+  size_t m_nextPage = 0;
+  const SourceMapRun* m_run = nullptr;
+  const SourceMapRun* m_pageEnd = nullptr;
   int64_t m_runBegin = 0;
 };
 
@@ -45,15 +76,35 @@ using SourceFileList = std::vector<std::unique_ptr<MpfwSourceFile>>;
 bool FindSourceLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
 void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception);
 
-// The sink of an expansion. `column` is -1 at the beginning of a line; a tab counts 4.
+// The column at which the lines of an expansion begin. Most expansions stand within a line, so that it is kept as a
+// place in the output and worked out when a line does begin.
+class LineIndent {
+ public:
+  LineIndent(int64_t columns = 0) : m_value(columns) {}
+  static LineIndent AtOffset(size_t offset) { return LineIndent(~static_cast<int64_t>(offset)); }
+  bool IsNone() const { return m_value == 0; }
+  size_t ColumnsIn(std::string_view output) const;  // a tab counts 4, any other byte 1
+
+ private:
+  int64_t m_value;  // columns, or the complement of an offset
+};
+
+// The sink of an expansion. Each line that begins in what is written gets the indent's blanks ahead of it.
 class ExpansionSink {
  public:
-  void WriteVerbatim(const TextRange& range, int64_t indent);
-  void WriteGenerated(std::string_view text, const TextRange& source, int64_t indent);
+  void WriteVerbatim(const TextRange& range, LineIndent indent);
+  void WriteGenerated(std::string_view text, const char* source, LineIndent indent);
+  bool AtLineStart() const { return output.empty() || output.back() == '\n'; }
+  LineIndent ColumnHere() const { return LineIndent::AtOffset(output.size()); }
 
   std::string output;
-  int64_t column = -1;
   SourceMap map;
+  size_t expectedSize = 0;  // the room to make once there is something to write
+
+ private:
+  void MakeRoom();
+  bool BeginsLine(std::string_view text) const;
+  void AddVerbatim(const char* begin, const char* end);
 };
 
 }  // namespace qrex

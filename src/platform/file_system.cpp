@@ -2,6 +2,7 @@
 
 #include <dirent.h>
 #include <fcntl.h>
+#include <sys/mman.h>
 #include <sys/stat.h>
 #include <unistd.h>
 
@@ -17,6 +18,7 @@ namespace qrex::platform {
 namespace {
 
 constexpr int64_t kUnixEpoch = 116444736000000000;  // 1970 on the scale of file times
+constexpr size_t kLargePage = 2u << 20;
 constexpr mode_t kWriteBits = S_IWUSR | S_IWGRP | S_IWOTH;
 
 int64_t FileTime(const timespec& time) { return kUnixEpoch + time.tv_sec * 10000000 + time.tv_nsec / 100; }
@@ -50,6 +52,19 @@ bool RefuseReadOnly(const std::string& path) {
 }
 
 }  // namespace
+
+void PreferLargePages(void* memory, size_t size) {
+  constexpr uintptr_t kPage = 4096;
+  if (size < kLargePage) return;
+  const uintptr_t begin = reinterpret_cast<uintptr_t>(memory) / kPage * kPage + kPage;
+  madvise(reinterpret_cast<void*>(begin), size - kPage, MADV_HUGEPAGE);
+}
+
+void ReserveText(std::string& text, size_t size) {
+  if (size >= kLargePage) size += kLargePage;  // so that the last of them holds the text's end
+  text.reserve(size);
+  PreferLargePages(text.data(), size);
+}
 
 bool Stat(const std::string& path, FileInfo& info) {
   SetLastError(0);
@@ -98,19 +113,17 @@ bool ReadFile(const std::string& path, std::string& content) {
     return false;
   }
   content.clear();
-  constexpr size_t kLeast = 4096;
-  size_t size = 0;
-  for (;;) {  // the size told may be wrong, as of a pipe or a file that grows
-    content.resize(std::max({size + kLeast, static_cast<size_t>(status.st_size) + 1, content.size()}));
-    const ssize_t got = read(file.Number(), content.data() + size, content.size() - size);
+  ReserveText(content,
+              static_cast<size_t>(status.st_size));  // no more than a hint: a pipe has no size, a file may grow
+  char block[65536];
+  for (;;) {
+    const ssize_t got = read(file.Number(), block, sizeof block);
     if (got < 0 && errno == EINTR) continue;
     if (got < 0) return false;
-    size += static_cast<size_t>(got);
-    const bool isPlainAndRead = S_ISREG(status.st_mode) && size < content.size();
-    if (got == 0 || isPlainAndRead) break;
+    content.append(block, static_cast<size_t>(got));
+    const bool isPlainAndRead = S_ISREG(status.st_mode) && static_cast<size_t>(got) < sizeof block;
+    if (got == 0 || isPlainAndRead) return true;
   }
-  content.resize(size);
-  return true;
 }
 
 bool WriteFile(const std::string& path, std::string_view content, bool mustBeNew) {

@@ -1,8 +1,9 @@
 #include "platform/system.h"
 
 #include <malloc.h>
-#include <pthread.h>
+#include <sys/mman.h>
 #include <sys/wait.h>
+#include <ucontext.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -15,6 +16,17 @@
 #include <string_view>
 
 #include "platform/file_system.h"
+
+#if defined(__has_feature)
+#if __has_feature(address_sanitizer)
+#define QREX_ADDRESS_SANITIZER
+#endif
+#elif defined(__SANITIZE_ADDRESS__)
+#define QREX_ADDRESS_SANITIZER
+#endif
+#ifdef QREX_ADDRESS_SANITIZER
+#include <sanitizer/common_interface_defs.h>
+#endif
 
 namespace qrex::platform {
 
@@ -31,16 +43,25 @@ timespec Now(clockid_t clock) {
 struct StackRun {
   const std::function<void()>& body;
   std::exception_ptr failure;
+  const void* outerStack = nullptr;
+  size_t outerSize = 0;
 };
 
-void* RunBody(void* argument) {
-  auto& run = *static_cast<StackRun*>(argument);
+StackRun* stackRun = nullptr;  // what RunBody is to run
+
+void RunBody() {
+  StackRun& run = *stackRun;
+#ifdef QREX_ADDRESS_SANITIZER
+  __sanitizer_finish_switch_fiber(nullptr, &run.outerStack, &run.outerSize);
+#endif
   try {
     run.body();
   } catch (...) {
     run.failure = std::current_exception();
   }
-  return nullptr;
+#ifdef QREX_ADDRESS_SANITIZER
+  __sanitizer_start_switch_fiber(nullptr, run.outerStack, run.outerSize);
+#endif
 }
 
 }  // namespace
@@ -159,22 +180,35 @@ LocalTime CurrentLocalTime() {
 }
 
 void RunOnStack(size_t bytes, const std::function<void()>& body) {
-  // One arena for all threads, which grows in large steps: a second one would grow page by page.
-  mallopt(M_ARENA_MAX, 1);
-  mallopt(M_TOP_PAD, 4 << 20);
+  mallopt(M_TOP_PAD, 4 << 20);  // the heap grows in large steps, not page by page
+  void* const stack =
+      mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
+  if (stack == MAP_FAILED) return body();  // no room for it: the stack at hand serves
+  mprotect(stack, 4096, PROT_NONE);        // what overflows it ends here
   StackRun run{body, nullptr};
-  pthread_attr_t attributes;
-  pthread_attr_init(&attributes);
-  pthread_attr_setstacksize(&attributes, bytes);
-  pthread_t thread;
-  const bool started = pthread_create(&thread, &attributes, RunBody, &run) == 0;
-  pthread_attr_destroy(&attributes);
-  if (started) {
-    pthread_join(thread, nullptr);
-  } else {
-    body();  // no memory for it: the stack at hand serves
-  }
+  ucontext_t here, there;
+  getcontext(&there);
+  there.uc_stack.ss_sp = stack;
+  there.uc_stack.ss_size = bytes;
+  there.uc_link = &here;
+  stackRun = &run;
+  makecontext(&there, RunBody, 0);
+#ifdef QREX_ADDRESS_SANITIZER
+  void* fakeStack = nullptr;
+  __sanitizer_start_switch_fiber(&fakeStack, stack, bytes);
+#endif
+  swapcontext(&here, &there);
+#ifdef QREX_ADDRESS_SANITIZER
+  __sanitizer_finish_switch_fiber(fakeStack, nullptr, nullptr);
+#endif
+  munmap(stack, bytes);
   if (run.failure) std::rethrow_exception(run.failure);
+}
+
+void TuneHeap() {
+  constexpr int kStep = 16 << 20;
+  mallopt(M_TOP_PAD, kStep);
+  mallopt(M_TRIM_THRESHOLD, 4 * kStep);
 }
 
 }  // namespace qrex::platform

@@ -1,17 +1,71 @@
 #include "text/output_policy.h"
 
+#include <algorithm>
+
+#include "platform/error.h"
+#include "platform/file_system.h"
 #include "text/files.h"
-#include "text/numbers.h"
 
 namespace qrex {
+
+void AppendWithCarriageReturns(std::string& out, std::string_view text) {
+  for (size_t lineFeed; (lineFeed = text.find('\n')) != std::string_view::npos; text.remove_prefix(lineFeed + 1)) {
+    out.append(text.substr(0, lineFeed)).append("\r\n", 2);
+  }
+  out.append(text);
+}
 
 std::string WithCarriageReturns(std::string_view text) {
   std::string out;
   out.reserve(text.size() + text.size() / 16);
-  for (size_t lineFeed; (lineFeed = text.find('\n')) != std::string_view::npos; text.remove_prefix(lineFeed + 1)) {
-    out.append(text.substr(0, lineFeed)).append("\r\n");
+  AppendWithCarriageReturns(out, text);
+  return out;
+}
+
+GeneratedFile::~GeneratedFile() {
+  if (!m_isSpilled) return;
+  m_beside.Close();
+  platform::RemoveFile(BesidePath());
+}
+
+void GeneratedFile::Write(const void* data, size_t length) {
+  constexpr size_t kMostInMemory = 256 << 10;
+  std::string_view text(static_cast<const char*>(data), length);
+  while (!text.empty()) {
+    const size_t piece = std::min(text.size(), kMostInMemory);
+    AppendWithCarriageReturns(m_text, text.substr(0, piece));
+    text.remove_prefix(piece);
+    if (m_text.size() >= kMostInMemory) Spill();
   }
-  return out.append(text);
+}
+
+void GeneratedFile::Spill() {
+  if (!m_isSpilled) {
+    CreateDirectories(m_path, false);
+    platform::RemoveFile(BesidePath());  // a leftover of a run that was killed
+    if (!m_beside.Open(BesidePath(), FileMode::WriteBinary)) throw FileException(m_path);
+    m_isSpilled = true;
+  }
+  m_beside.Write(m_text.data(), m_text.size());
+  m_text.clear();
+}
+
+std::string GeneratedFile::Text() {
+  if (!m_isSpilled) return m_text;
+  Spill();
+  m_beside.Flush();
+  std::string text;
+  ReadWholeFile(text, BesidePath());
+  return text;
+}
+
+void GeneratedFile::Commit() {
+  if (!m_isSpilled) return ReplaceFile(m_path, m_text);
+  Spill();
+  m_beside.Close();
+  if (platform::IsReadOnlyFile(m_path)) throw FileException(platform::kErrorAccessDenied, m_path);
+  if (!platform::RenameFile(BesidePath(), m_path)) throw FileException(m_path);
+  m_isSpilled = false;
 }
 
 int WriteIfChanged(MemoryTextWriter& writer, const std::string& path) {

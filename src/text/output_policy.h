@@ -4,6 +4,7 @@
 
 #include <string>
 
+#include "text/files.h"
 #include "text/text_writer.h"
 
 namespace qrex {
@@ -14,6 +15,27 @@ int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);
 
 // The text with each line feed as CR LF: how every generated file stands on disk.
 std::string WithCarriageReturns(std::string_view text);
+void AppendWithCarriageReturns(std::string& out, std::string_view text);
+
+// A generated file in the making, with CR LF line ends. It replaces the target as a whole when it is committed; without
+// that it leaves no trace. A long text goes to the file beside the target as it comes and is not kept in memory.
+class GeneratedFile : public IOutputStream {
+ public:
+  explicit GeneratedFile(std::string path) : m_path(std::move(path)) {}
+  ~GeneratedFile() override;
+  void Write(const void* data, size_t length) override;  // raises FileException
+  void Flush() override {}
+  std::string Text();  // all that was written
+  void Commit();       // raises FileException. A read-only target fails with code 5
+
+ private:
+  std::string BesidePath() const { return m_path + ".part"; }
+  void Spill();
+  const std::string m_path;
+  std::string m_text;
+  File m_beside;
+  bool m_isSpilled = false;
+};
 
 // Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time.
 bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly);

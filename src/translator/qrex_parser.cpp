@@ -70,6 +70,22 @@ void QrexParser::CopyTo(const char* position) {
 void QrexParser::Translate() {
   const FileKind kind = file.file.kind;
   const bool checksIncludes = kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H;
+  const auto isActedOn = [checksIncludes](const LexToken& token) {
+    switch (token.kind) {
+      case kIdentifier:
+        return token.Is("using") || token.Is("namespace");
+      case kHash:
+        return checksIncludes;
+      case kAt:
+      case kOpenBrace:
+      case kCloseBrace:
+      case kDollar:
+      case kEndOfText:
+        return true;
+      default:
+        return false;
+    }
+  };
   while (current.kind != kEndOfText) {
     if (checksIncludes && Is(kHash)) {
       CheckInclude();
@@ -91,7 +107,7 @@ void QrexParser::Translate() {
       Advance();
       Dispatch();
     } else {
-      Advance();
+      AdvanceUntil(isActedOn);
     }
   }
   CopyTo(expanded.end);
@@ -269,6 +285,8 @@ std::string IncludeGuard(std::string_view path) {
 
 void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded) {
   const FileKind kind = file.file.kind;
+  constexpr size_t kUsualLine = 32;
+  file.lineTable.reserve(expanded.Size() / kUsualLine);
   QrexParserOutputStream stream(target, file.lineTable, expanded, file.expansionMap);
   TextWriter out(stream);
   if (kind == FileKind::H) {
@@ -298,9 +316,8 @@ void TranslateFile(ScannedFile& file, IOutputStream& target) {
   file.lineTable.clear();
   TextRange expanded;
   try {
-    file.expandedText =
-        ExpandToStringWithMap(&file, file.frame, TextRange(std::string_view(file.sourceText)), 0, 0, file.expansionMap);
-    expanded = TextRange(std::string_view(file.expandedText));
+    expanded = ExpandWithMap(&file, file.frame, TextRange(std::string_view(file.sourceText)), 0, 0, file.expandedText,
+                             file.expansionMap);
     TranslateText(file, target, expanded);
   } catch (LexScannerException& exception) {
     MapErrorPosition(file.expansionMap, expanded, exception);

@@ -20,14 +20,10 @@ namespace {
 constexpr std::string_view kIObjectPath = "Vesk/vxObject/IObject.h";
 constexpr int64_t kHeaderHeadLines = 4;
 
-class BufferStream : public IOutputStream {
+class DiscardStream : public IOutputStream {
  public:
-  void Write(const void* data, size_t length) override { m_text.append(static_cast<const char*>(data), length); }
+  void Write(const void*, size_t) override {}
   void Flush() override {}
-  const std::string& Text() const { return m_text; }
-
- private:
-  std::string m_text;
 };
 
 bool IsTranslatedKind(FileKind kind) {
@@ -40,11 +36,12 @@ void PrepareTarget(const std::string& path) {
   ChangeReadOnly(path, false);
 }
 
-bool IsTokenEquivalent(const std::string& path, std::string_view text) {
+bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated) {
   std::string old;
   if (!ReadWholeFile(old, path)) return false;
+  const std::string text = generated.Text();
   try {
-    return SameTokens(LexScanner(std::string_view(old)), LexScanner(text));
+    return SameTokens(LexScanner(std::string_view(old)), LexScanner(std::string_view(text)));
   } catch (const LexScannerException&) {
     return false;  // what stood there is no text of ours
   }
@@ -164,22 +161,24 @@ void ScannedFile::WriteTranslation(const std::string& target) {
   const std::vector<ScannedFile*> knownImports = std::move(imports);
   imports.clear();
   importClosure = {};
-  BufferStream generated;
+  GeneratedFile generated(target);
+  DiscardStream discarded;
+  IOutputStream& out = needsWriting ? static_cast<IOutputStream&>(generated) : discarded;
   try {
-    TranslateFile(*this, generated);
+    TranslateFile(*this, out);
   } catch (...) {
     imports = knownImports;  // a part of them would hide from the next run what makes this file stale
     throw;
   }
-
   if (!needsWriting) return;
+
   const ConfigSettings& settings = host.Settings();
-  if (!settings.writeTokenEquivalent && IsTokenEquivalent(target, generated.Text())) {
+  if (!settings.writeTokenEquivalent && IsTokenEquivalent(target, generated)) {
     if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
   } else {
     if (settings.diagnostics) TraceWriter() << "Writing: " << target << "\n";
     PrepareTarget(target);
-    ReplaceFile(target, WithCarriageReturns(generated.Text()));
+    generated.Commit();
     if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
   }
   needsWriting = false;

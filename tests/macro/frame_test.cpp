@@ -103,13 +103,15 @@ TEST_F(FrameTest, Dump) {
 // The runs as "begin+length" of the source text, "=" in front of a generated one, "indent" for blanks.
 std::string Runs(const SourceMap& map, const std::string& source) {
   std::string runs;
-  for (const SourceMapRun& run : map) {
+  EXPECT_EQ(1u, map.PageCount());
+  for (const SourceMapRun* it = map.PageBegin(0); it != map.PageEnd(0); ++it) {
+    const SourceMapRun& run = *it;
     if (!runs.empty()) runs += " ";
-    if (!run.sourceBegin) {
-      runs += "indent+" + std::to_string(run.generatedLength);
+    if (!run.SourceBegin()) {
+      runs += "indent+" + std::to_string(run.Length());
     } else {
-      runs += (run.generatedLength ? "=" : "") + std::to_string(run.sourceBegin - source.data()) + "+" +
-              std::to_string(run.OutputLength());
+      runs += (run.IsGenerated() ? "=" : "") + std::to_string(run.SourceBegin() - source.data()) + "+" +
+              std::to_string(run.Length());
     }
   }
   return runs;
@@ -125,14 +127,14 @@ TEST(SourceMapTest, Sink) {
   sink.WriteVerbatim(whole, 4);
   EXPECT_EQ("    ab\n    cd", sink.output);
   EXPECT_EQ("indent+4 0+3 indent+4 3+2", Runs(sink.map, source));
-  EXPECT_EQ(6, sink.column);
-  sink.WriteGenerated("\t1\n2", {source.data() + 1, source.data() + 2}, 4);
+  EXPECT_EQ(6u, sink.ColumnHere().ColumnsIn(sink.output));
+  sink.WriteGenerated("\t1\n2", source.data() + 1, 4);
   EXPECT_EQ("    ab\n    cd\t1\n    2", sink.output);
   EXPECT_EQ("indent+4 0+3 indent+4 3+2 =1+8", Runs(sink.map, source));
-  EXPECT_EQ(5, sink.column);
-  sink.WriteGenerated("", whole, 4);
+  EXPECT_EQ(5u, sink.ColumnHere().ColumnsIn(sink.output));
+  sink.WriteGenerated("", source.data(), 4);
   sink.WriteVerbatim({source.data() + 2, source.data() + 2}, 4);
-  EXPECT_EQ(5u, sink.map.size());
+  EXPECT_EQ("indent+4 0+3 indent+4 3+2 =1+8", Runs(sink.map, source));
   EXPECT_EQ(nullptr, MapOutputOffset(sink.map, 3));
   EXPECT_EQ(source.data(), MapOutputOffset(sink.map, 4));
   EXPECT_EQ(source.data() + 4, MapOutputOffset(sink.map, 12));
@@ -176,7 +178,8 @@ TEST(SourceMapTest, Positions) {
   const std::string output = "12";
   const TextRange range{std::string_view(output)};
   const char* source = files[0]->text.data();
-  const SourceMap map{{source, source + 2, 0}};
+  SourceMap map;
+  map.AddVerbatim(source, source + 2);
   const auto mapped = [&](const char* position) {
     LexScannerException exception("no", position);
     MapErrorPosition(map, range, exception);

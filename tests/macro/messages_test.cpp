@@ -3,7 +3,6 @@
 #include <utility>
 
 #include "expand_fixture.h"
-#include "macro/expansion_context.h"
 #include "platform/system.h"
 
 namespace qrex {
@@ -196,10 +195,23 @@ TEST_F(MessagesTest, SelfExpansionEnds) {
 }
 
 TEST_F(MessagesTest, EndlessLoopEnds) {
-  const int64_t bound = std::exchange(maxIterations, 1000);
+  const int64_t bound = std::exchange(expansionLimits.iterations, 1000);
   EXPECT_EQ("1000", Expand("@let int i = 0\n@while (i < 1000) {@let i = i + 1\n}i"));
   EXPECT_EQ("t(1) : Too many iterations in @while directive", Expand("@while (true) {}"));
-  maxIterations = bound;
+  expansionLimits.iterations = bound;
+}
+
+TEST_F(MessagesTest, MultiplyingMacrosEnd) {
+  const ExpansionLimits limits = std::exchange(expansionLimits, {1000, 10000, 1000});
+  std::string doubling = "@def a0 = \"0123456789\"\n";
+  for (int i = 1; i < 20; ++i) {
+    const std::string inner = "a" + std::to_string(i - 1);
+    doubling += "@def a" + std::to_string(i) + " = " + inner + " " + inner + "\n";
+  }
+  EXPECT_NE(std::string::npos, Expand(doubling + "a19").find("Too many macro expansions"));
+  expansionLimits.parts = limits.parts;
+  EXPECT_NE(std::string::npos, Expand(doubling + "a19").find("Expanded text is too long"));
+  expansionLimits = limits;
 }
 
 TEST_F(MessagesTest, DeepBracketsAreNoNesting) {

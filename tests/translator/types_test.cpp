@@ -22,7 +22,8 @@ class TypesTest : public TranslateTest {
   std::string Parse(const std::string& text, Read read) {
     m_texts.push_back(std::make_unique<std::string>(text));
     const TextRange range{std::string_view(*m_texts.back())};
-    const SourceMap map{{range.begin, range.end, 0}};
+    SourceMap map;
+    map.AddVerbatim(range.begin, range.end);
     MemoryTextWriter sink;
     struct Target : IOutputStream {
       void Write(const void*, size_t) override {}
