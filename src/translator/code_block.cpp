@@ -134,13 +134,13 @@ std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::st
     return body;
   }
   CodeText code(parser, def, parser.current.text.begin);
-  const char* end = parser.current.text.begin;  // of the last token: a comment behind it would hide the `;`
+  const char* end = parser.current.text.begin;  // of the last token: a comment behind it stays out
   while (!parser.Is(kSemicolon)) {
     if (parser.Is(kEndOfText)) parser.Fail("Met EOS while scanning forwards for semicolon");
     if (!code.TakeItem()) parser.Advance();
     end = parser.previous.text.end;
   }
-  return name + " = " + code.TextTo(end) + ";";
+  return name + " = " + code.TextTo(end);
 }
 
 std::string_view PassingSuffix(std::string_view type) {

@@ -49,7 +49,7 @@ TEST_F(CachedFunctionsTest, AsyncByReferenceWithInputInMixin) {
   EXPECT_EQ(
       R"~(void _calc_f_input(vesk::string8& in) const
 {
-    in = name();
+    in = name()
 }
 void _calc_f(vesk::xvector<vesk::int32>& out,vesk::string8 in) const
 { }

@@ -96,7 +96,7 @@ vesk::string8 const& Geta() const { a.ReadBarrier(); return _a_; }
 
 TEST_F(DepFieldsTest, DepWithoutSections) {
   const std::string text = Body("$dep int32 a = b + 1;\n");
-  EXPECT_EQ("(vesk::int32& a) const\n{\n    a = b + 1;\n}\n", Section(text, "void a_calc", "mutable"));
+  EXPECT_EQ("(vesk::int32& a) const\n{\n    a = b + 1\n}\n", Section(text, "void a_calc", "mutable"));
   EXPECT_EQ("vesk::DGDepNode(vesk::DF_SYNC_DEP) {}\n", Section(text, "Depnode_a() : ", "    virtual"));
   EXPECT_EQ(R"(    {
         S const* _self = CONST_ATTRIB_CAST(S,a);
@@ -149,8 +149,8 @@ TEST_F(DepFieldsTest, ShortBodies) {
   const auto bodyOf = [this](const std::string& definition) {
     return Section(Body("$dep int32 a = " + definition + "\n"), "void a_calc(vesk::int32& a) const\n{\n", "}\nmutable");
   };
-  EXPECT_EQ("    a = f(x, y);\n", bodyOf("f(x, y) /* why */ ;"));
-  EXPECT_EQ("    a = vesk::DollarNew(new X(1))->n + S::k;\n", bodyOf("$new X(1)->n + $$::k;"));
+  EXPECT_EQ("    a = f(x, y)\n", bodyOf("f(x, y) /* why */ ;"));
+  EXPECT_EQ("    a = vesk::DollarNew(new X(1))->n + S::k\n", bodyOf("$new X(1)->n + $$::k;"));
   EXPECT_EQ("    a = this->GetThisAsFinalClass()->b;\n", bodyOf("{ a = $this->b; };"));
   EXPECT_EQ("    if (x) { a = 1; } // one\n", bodyOf("{ if (x) { a = 1; } // one\n };"));
 }
