@@ -20,6 +20,7 @@ PROJECT = """$TARGET_TYPE = "Application"
 $ROOT_TO_PROJDIR = "app"
 qrex
 config { "Debug|x64" "Release|x64" }
+subproj { "Vesk/vxObject" }
 {
 "src" { %s }
 }
@@ -32,11 +33,28 @@ def write(path, text):
         file.write(text)
 
 
+OBJECT_HEADER = """namespace vesk
+{
+$interface+ IObject { };
+$interface+ IPersistable : IObject { };
+}
+"""
+OBJECT_PROJECT = """$TARGET_TYPE = "Utility Project"
+$ROOT_TO_PROJDIR = "Vesk/vxObject"
+qrex
+config { "Debug|x64" "Release|x64" }
+{ "IObject.h" }
+"""
+
+
 def workspace(root, files):
-    """A workspace with one project, `app`, whose sources are `files` (name: text). `Qrex main.qrex` in root builds it."""
+    """A workspace with one project, `app`, whose sources are `files` (name: text), and the head of the runtime.
+    `Qrex main.qrex` in root builds it."""
     write(f"{root}/main.qrex", CONFIGURATION)
     write(f"{root}/tree/.qrwsroot", "")
-    write(f"{root}/tree/ws/all.qrws", '"all" { "app" }\n')
+    write(f"{root}/tree/ws/all.qrws", '"all" { "Vesk/vxObject" "app" }\n')
+    write(f"{root}/tree/Vesk/vxObject/IObject.h", OBJECT_HEADER)
+    write(f"{root}/tree/Vesk/vxObject/src/vxObject.qrpj", OBJECT_PROJECT)
     write(f"{root}/tree/app/src/app.qrpj", PROJECT % " ".join(f'"{name}"' for name in files))
     for name, text in files.items():
         write(f"{root}/tree/app/src/{name}", text)
@@ -186,3 +204,35 @@ def import_chain(root, count):
     files["main.cpp"] = f'@import "h{count - 1}.h"\nint main() {{ return f{count - 1}(0); }}\n'
     workspace(root, files)
     return {"size": sum(map(len, files.values()))}
+
+
+def reflected_classes(root, count, per_header=10):
+    """Chained headers of reflected classes, and the same fields as messages for protoc and as properties for moc, in as
+    many files (proto/) and in one (moc/classes.h)."""
+    headers = count // per_header
+    files, moc = {}, ["#include <QObject>\n#include <QString>\n"]
+    scalars = [("int32", "int32", "int"), ("float64", "double", "double"), ("bool", "bool", "bool"),
+               ("string8", "string", "QString"), ("int64", "int64", "qint64"), ("float32", "float", "float")]
+    for header in range(headers):
+        before = header - 1
+        pieces = [f'@import "h{before}.h"\n' if header else '@import "Vesk/vxObject/IObject.h"\n']
+        proto = ['syntax = "proto3";\npackage bench;\n', f'import "p{before}.proto";\n' if header else ""]
+        for number in range(header * per_header, (header + 1) * per_header):
+            fields = [(ours, theirs, qt, f"field{i}_{number}") for i, (ours, theirs, qt) in enumerate(scalars)]
+            pieces.append(f"$struct+ Class{number}\n{{\n" +
+                          "".join(f"    ${ours} {name};\n" for ours, _, _, name in fields) + "};\n")
+            proto.append(f"message Class{number} {{\n" +
+                         "".join(f"  {theirs} {name} = {i + 1};\n" for i, (_, theirs, _, name) in enumerate(fields)) + "}\n")
+            moc.append(f"class Class{number} : public QObject\n{{\n    Q_OBJECT\n" +
+                       "".join(f"    Q_PROPERTY({qt} {name} MEMBER {name})\n" for _, _, qt, name in fields) +
+                       "public:\n" + "".join(f"    {qt} {name};\n" for _, _, qt, name in fields) + "};\n")
+        if header:  # a field of a class of the header before
+            proto.append(f"message Uses{header} {{ Class{before * per_header} used = 1; }}\n")
+            pieces.append(f"$struct+ Uses{header} {{ $Class{before * per_header} used; }};\n")
+        files[f"h{header}.h"] = "".join(pieces)
+        write(f"{root}/proto/p{header}.proto", "".join(proto))
+    files["app.cpp"] = "".join(f'@import "h{header}.h"\n' for header in range(headers))
+    workspace(root, files)
+    write(f"{root}/moc/classes.h", "".join(moc))
+    os.makedirs(f"{root}/cpp", exist_ok=True)
+    return {"size": sum(map(len, files.values())), "proto": [f"p{header}.proto" for header in range(headers)]}
