@@ -21,14 +21,14 @@ public:
 
     $indep float64 price;
     $indep int32 pieces create { pieces = 4; };
-    $dep float64 subtotal = pieces * price;
+    $dep float64 subtotal = { subtotal = pieces * price; };
     $dep bool isLarge = { ++m_calculations; isLarge = subtotal > 20; };
     $dep vesk::string8 label
         calc { ++m_calculations; label = isLarge ? "large" : "small"; }
         evict { ++m_evictions; _label_.clear(); };
 
     $cache float64 Share(int32 people, int32 rounds) const { ++m_calculations; return subtotal / people / rounds; }
-    $cache <<async>> int32 Forecast() const with int32 sold = pieces; { ++m_calculations; return 10 * sold; }
+    $cache <<async>> int32 Forecast() const with int32 sold = { sold = pieces; }; { ++m_calculations; return 10 * sold; }
 
     void Quote(int32 n, const vesk::string8& customer, float64& quoted) { quoted = customer.empty() ? 0 : n * price; }
     void Rename(vesk::string8& name) { name = "dear " + name; }

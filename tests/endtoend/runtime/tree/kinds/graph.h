@@ -19,8 +19,8 @@ public:
         visit { _v << seen; }
         evictable { return false; }
         evict { };
-    $dep int32 twice = source * 2 + int32(input);
-    $dep ^ int32 hard = source / 10;
+    $dep int32 twice = { twice = source * 2 + int32(input); };
+    $dep ^ int32 hard = { hard = source / 10; };
     $dep vesk::xvector<int32> list calc { list.clear(); for (int i = 0; i < source; ++i) list.push_back(i); };
     $dep <<-visit>> int32* pointer calc { pointer = nullptr; };
     $dep int32 sections
@@ -33,8 +33,8 @@ public:
         invalidate { ++invalidated; };
     $dep void effect calc { ++effects; (void)source.read(); };
     $dep - int32 unreflected = { unreflected = source; };
-    $dep int32 cyclic = backAgain + 1;
-    $dep int32 backAgain = cyclic + 1;
+    $dep int32 cyclic = { cyclic = backAgain + 1; };
+    $dep int32 backAgain = { backAgain = cyclic + 1; };
     $dep int32 total = { total = 0; for (int i = 0; i < items.read().size(); ++i) total += items[i]; };
 
     $cache int32 tens() const { ++calculated; return source / 10; }
@@ -43,7 +43,7 @@ public:
     $cache int32 sum(int32 a, const vesk::string8& b, int32 c = 1) const { return source + a + int32(b.size()) + c; }
     $cache void keyed(vesk::string8& out, int32 n) const { out = vesk::string8(n, 'x'); }
     $cache <<async>> int32 later() const { return source + 1; }
-    $cache <<async io>> void laterInto(int32& out) const with int32 in = source; { out = in * 2; }
+    $cache <<async io>> void laterInto(int32& out) const with int32 in = { in = source; }; { out = in * 2; }
     $cache <<async queue(1)>> int32 laterKeyed(int32 k) const
         with vesk::xvector<int32> in { in.push_back(source); in.push_back(k); }
     {
@@ -61,7 +61,7 @@ public:
 $struct Nodes
 {
     $indep int32 a;
-    $dep int32 b = a + 1;
+    $dep int32 b = { b = a + 1; };
     $cache int32 c() const { return b + 1; }
     $evict { }
 };
@@ -69,11 +69,11 @@ $struct Nodes
 $mixin NodeMixin
 {
     $indep int32 base;
-    $dep int32 derived = base + 1;
+    $dep int32 derived = { derived = base + 1; };
     $dep void action calc { };
     typename BC::FinalClass const* Final() const { return $this; }
 };
-$class+ WithNodes isa shapes::INamed : mixin [ NodeMixin { $dep int32 more = 4; } ]
+$class+ WithNodes isa shapes::INamed : mixin [ NodeMixin { $dep int32 more = { more = 4; }; } ]
 {
 public:
     vesk::string8 Name() const { return "nodes"; }
