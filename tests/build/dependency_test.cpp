@@ -182,10 +182,10 @@ TEST_F(DependencyTest, LatestTimes) {
   WriteFiles({{"a.h", {1, 20}}, {"b.h", {2, 10}}, {"c.h", {3, -1}}});
   File("app/b.h").imports = {&File("app/a.h")};
   File("app/a.h").imports = {&File("app/b.h")};  // as no run writes it
-  EXPECT_EQ(moment + 2, LatestSourceTime(File("app/b.h")));
+  EXPECT_EQ(moment + 2, LatestSourceTime(*builder, File("app/b.h")));
   EXPECT_EQ(moment + 20, LatestTargetTime(*builder, File("app/b.h")));
   std::filesystem::remove("tree/app/b.h");
-  EXPECT_EQ(moment + 2, LatestSourceTime(File("app/b.h")));  // looked up once
+  EXPECT_EQ(moment + 2, LatestSourceTime(*builder, File("app/b.h")));  // looked up once
   try {
     LatestTargetTime(*builder, File("app/c.h"));
     FAIL();

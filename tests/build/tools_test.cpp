@@ -5,6 +5,7 @@
 #include "build/tools.h"
 
 #include <gtest/gtest.h>
+#include <unistd.h>
 
 #include <filesystem>
 
@@ -24,7 +25,7 @@ class ToolsTest : public ::testing::Test, public TraceHook {
  protected:
   ToolsTest() : m_start(std::filesystem::current_path()), m_path(std::getenv("PATH")) {
     m_folder = std::filesystem::path(::testing::TempDir()) /
-               (std::string("tools.") + ::testing::UnitTest::GetInstance()->current_test_info()->name());
+               ("tools." + std::to_string(getpid()) + ::testing::UnitTest::GetInstance()->current_test_info()->name());
     std::filesystem::remove_all(m_folder);
     std::filesystem::create_directories(m_folder);
     std::filesystem::current_path(m_folder);
