@@ -19,6 +19,9 @@ def shapes(binary):
         holds(workspace.run("shapes.qrex"), "Completed.")
         equal(workspace.shell("out/lib/x64/Debug/app"), """class geo::Box
     geo::Point[2] corners
+class geo::Canvas
+    float64 width
+    float64 height
 class geo::Circle ["round"]
     geo::Point centre
     float64 radius
@@ -37,6 +40,11 @@ after Scale(0.5):
     centre = (3,4)
     radius = 1
 a pair, used 1 times
+3000 mm, 750 mm, 1500 mm as they are
+3 m, 0.75 m, 1.5 m as they are
+measured 6, in metres 2.54
+variable geo::conversions
+canvas 6 6, a share 2, wider 12, a share 4, calculated 2 times
 """)
 
 

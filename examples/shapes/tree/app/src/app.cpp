@@ -1,5 +1,6 @@
 @import "Vesk/vxObject/IObject.h"
 @import "shapes/api/shape.h"
+@import "shapes/api/kinds.h"
 
 vxDefineTarget(app, 1)
 void Register_Project_app();
@@ -71,4 +72,21 @@ int main()
     geo::Pair<int, bool> pair;
     pair.Setuses(1);
     xout() << "a pair, used " << pair.uses << " times\n";
+
+    for (geo::Length length : {geo::Length(1500), geo::Length(1.5)})
+    {
+        xout() << geo::Scaled(length, 2.0) << ", " << geo::Scaled(length, 50) << ", " << geo::Scaled(length, true) << '\n';
+    }
+    $makefunctor geo::Measure area { return width * height; }
+    xout() << "measured " << area(2, 3) << ", in metres " << geo::InMetres(100, geo::Unit::Inch) << '\n';
+    for (vesk::ReflectedGlobalVariable const* variable : vesk::All<vesk::ReflectedGlobalVariable>())
+    {
+        xout() << "variable " << variable->m_name << '\n';
+    }
+
+    geo::Canvas canvas;
+    xout() << "canvas " << canvas.area << ' ' << canvas.area << ", a share " << canvas.Share(3);
+    canvas.width = 6;
+    xout() << ", wider " << canvas.area << ", a share " << canvas.Share(3) << ", calculated " << canvas.m_calculations
+           << " times\n";
 }

@@ -1,5 +1,6 @@
 @import "api/point.h"
 @import "api/shape.h"
+@import "api/kinds.h"
 
 #include <cmath>
 
@@ -33,6 +34,14 @@ vesk::float64 Drawing::Area() const
         for (const vesk::ptr<IShape>& shape : layer.shapes) sum += shape->Area();
     }
     return sum;
+}
+
+$var+ int32 conversions = 0;
+
+vesk::float64 InMetres(vesk::float64 length, Unit unit)
+{
+    ++conversions;
+    return unit == Unit::Millimetre ? length / 1000 : unit == Unit::Inch ? length * 0.0254 : length;
 }
 
 }
