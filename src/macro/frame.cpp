@@ -147,8 +147,11 @@ class DefinitionTable {
     LSVariable* variable;
   };
 
-  void Enter(std::string_view name, size_t frame, LSVariable* variable) {
-    m_entries[std::string(name)].push_back({frame, variable});
+  // The table's own text of the name; it stays until the entry is removed.
+  std::string_view Enter(std::string_view name, size_t frame, LSVariable* variable) {
+    auto& [ownName, entries] = *m_entries.try_emplace(std::string(name)).first;
+    entries.push_back({frame, variable});
+    return ownName;
   }
 
   void Replace(std::string_view name, size_t frame, LSVariable* variable) {
@@ -197,9 +200,8 @@ constexpr size_t kMaxSubstituted = 64u << 20;
 LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(NextFrameIndex()) { m_fileFrame = this; }
 
 LSFileFrame::~LSFileFrame() {
-  for (const auto& variable : m_variables) {
-    if (!IsPredefined(variable->name.View())) Definitions().Remove(variable->name.View(), m_index);
-  }
+  // Not by the names of the variables: these may stand in the text of another file, which may be gone.
+  for (std::string_view name : m_entered) Definitions().Remove(name, m_index);
 }
 
 void LSFileFrame::OnAdded(LSVariable& variable, bool replaces) {
@@ -208,7 +210,7 @@ void LSFileFrame::OnAdded(LSVariable& variable, bool replaces) {
   if (replaces) {
     Definitions().Replace(name, m_index, &variable);
   } else {
-    Definitions().Enter(name, m_index, &variable);
+    m_entered.push_back(Definitions().Enter(name, m_index, &variable));
   }
 }
 

@@ -171,6 +171,7 @@ class LSFileFrame : public LSFrame {
 
   const size_t m_index;
   IndexSet m_allImports;
+  std::vector<std::string_view> m_entered;  // names in the table of all definitions
   std::vector<LSFileFrame*> m_directImports;
   std::vector<LSFileFrame*> m_orderedImports;
   std::map<std::string, std::string, std::less<>> m_substitutions;
