@@ -180,7 +180,6 @@ LocalTime CurrentLocalTime() {
 }
 
 void RunOnStack(size_t bytes, const std::function<void()>& body) {
-  mallopt(M_TOP_PAD, 4 << 20);  // the heap grows in large steps, not page by page
   void* const stack =
       mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
   if (stack == MAP_FAILED) return body();  // no room for it: the stack at hand serves
