@@ -1,5 +1,6 @@
-// Types: their codes, their spellings, what they can do, and all that may be wrong with them.
+// Types: their codes, their spellings, what they can do, all that may be wrong with them; and their byte code.
 
+#include "translator/byte_code.h"
 #include "translator/emit.h"
 #include "translator/translate_fixture.h"
 
@@ -263,29 +264,19 @@ TEST_F(TypesTest, Spellings) {
 }
 
 TEST_F(TypesTest, Sizes) {
-  const std::pair<std::string, int64_t> cases[] = {{"bool", 1},
-                                                   {"char16", 2},
-                                                   {"float32", 4},
-                                                   {"uint64", 8},
-                                                   {"int128", 16},
-                                                   {"string8", 24},
-                                                   {"E", 4},
-                                                   {"F", 16},
-                                                   {"K*", 8},
-                                                   {"ptr<n::I>", 16},
-                                                   {"n::T", 24},
-                                                   {"xlist<K>", -1},
-                                                   {"K", -1},
-                                                   {"V", -1},
-                                                   {"int16 x[3][5]", 30},
-                                                   {"K x[2]", -1},
-                                                   {"CK", -1},
-                                                   {"const E", 4},
-                                                   {"n::I", -1},
-                                                   {"xmap<int8,K>", 24},
-                                                   {"movable<cref<K>>", 24},
-                                                   {"int32&", -1}};
-  for (const auto& [text, size] : cases) EXPECT_EQ(size, SizeInBytes(CodeOf(text), Root())) << text;
+  const std::pair<int64_t, std::vector<std::string>> cases[] = {
+      {1, {"bool"}},
+      {2, {"char16"}},
+      {4, {"float32", "E", "const E"}},
+      {8, {"uint64", "K*"}},
+      {16, {"int128", "F", "ptr<n::I>"}},
+      {24, {"string8", "n::T", "xmap<int8,K>", "movable<cref<K>>"}},
+      {30, {"int16 x[3][5]"}},
+      {-1, {"xlist<K>", "K", "V", "K x[2]", "CK", "n::I", "int32&"}},
+  };
+  for (const auto& [size, texts] : cases) {
+    for (const std::string& text : texts) EXPECT_EQ(size, SizeInBytes(CodeOf(text), Root())) << text;
+  }
 }
 
 TEST_F(TypesTest, SameTypes) {
@@ -303,33 +294,20 @@ TEST_F(TypesTest, SameTypes) {
 
 TEST_F(TypesTest, WhatTypesCanDo) {
   // serialised, visited for objects, visited for prefs
-  const std::pair<std::string, std::string> cases[] = {{"int32", "s"},
-                                                       {"void", ""},
-                                                       {"E", "s"},
-                                                       {"F", ""},
-                                                       {"K*", "o"},
-                                                       {"n::I", ""},
-                                                       {"pref<n::I>", "sop"},
-                                                       {"ptr<n::I>", "o"},
-                                                       {"cref<K>", "sop"},
-                                                       {"K", ""},
-                                                       {"n::M", "s"},
-                                                       {"O", "sop"},
-                                                       {"xvector<O>", "sop"},
-                                                       {"O x[2]", "sop"},
-                                                       {"const int32", ""},
-                                                       {"xset<int8>", "sop"},
-                                                       {"xmap<int8,K>", "op"},
-                                                       {"xmap<K,int8>", "op"},
-                                                       {"n::T", "s"},
-                                                       {"openvariant<V>", "s"},
-                                                       {"O&", "op"},
-                                                       {"movable<pref<n::I>>", "sop"}};
-  for (const auto& [text, can] : cases) {
-    const TypeCode code = CodeOf(text);
-    EXPECT_EQ(can, std::string(IsSerialisable(code, Root()) ? "s" : "") + (NeedsVisitObjects(code, Root()) ? "o" : "") +
-                       (NeedsVisitPrefs(code, Root()) ? "p" : ""))
-        << text;
+  const std::pair<std::string, std::vector<std::string>> cases[] = {
+      {"", {"void", "F", "n::I", "K", "const int32"}},
+      {"s", {"int32", "E", "n::M", "n::T", "openvariant<V>"}},
+      {"o", {"K*", "ptr<n::I>"}},
+      {"op", {"xmap<int8,K>", "xmap<K,int8>", "O&"}},
+      {"sop", {"pref<n::I>", "cref<K>", "O", "xvector<O>", "O x[2]", "xset<int8>", "movable<pref<n::I>>"}},
+  };
+  for (const auto& [can, texts] : cases) {
+    for (const std::string& text : texts) {
+      const TypeCode code = CodeOf(text);
+      EXPECT_EQ(can, std::string(IsSerialisable(code, Root()) ? "s" : "") +
+                         (NeedsVisitObjects(code, Root()) ? "o" : "") + (NeedsVisitPrefs(code, Root()) ? "p" : ""))
+          << text;
+    }
   }
   EXPECT_TRUE(HasMetadata(CodeOf("xmap<int8,const int8 : [1]>")));
   EXPECT_FALSE(HasMetadata(CodeOf("xmap<int8,K*>")));
@@ -406,6 +384,56 @@ TEST_F(TypesTest, FieldTypes) {
       {"ptr<E>", "ptr<T> doesn't support serialisation"},
   };
   for (const auto& [text, message] : serialised) EXPECT_EQ(message, fault(text, false, true));
+}
+
+// --- Byte code: the codes above with each name as an index into the string table of the record.
+
+TEST_F(TypesTest, ByteCode) {
+  const std::string fifteen = "0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,";
+  const std::array<std::string, 3> cases[] = {
+      // the type, its bytes, and the strings that it adds
+      {"xmap<string8,const int8*[259]>", "0x51,0x10,0x50,0x03,0x01,0x00,0x00,0x35,0x31,0x02", ""},
+      {"xmap<n::S,xvector<E>>", "0x51,0x20,0x00,0x00,0x44,0x23,0x01,0x00", "    \"n::S\",\n    \"E\",\n"},
+      {"n::T*", "0x35,0x22,0x02,0x00", "    \"n::T\",\n"},
+      {"n::S&", "0x36,0x20,0x00,0x00", ""},
+      {"int32 : [7, \"x\\n\", true, 1.0, f(E)]",
+       "0xe5,0xa2,0x07,0x00,0x00,0x00,0xa4,0x03,0x00,0xa1,0x01,0xa3,0x00,0x00,0x00,0x00,\n"
+       "    0x00,0x00,0xf0,0x3f,0xc1,0x04,0x00,0xc0,0x01,0x00,0x04",
+       "    \"x\\n\",\n    \"f\",\n"},
+      {"int32" + std::string(15, '*'), fifteen + "0x04", ""},
+      {"int32" + std::string(16, '*'), fifteen + "0x35,\n    0x04", ""},
+  };
+  StringTable strings;
+  std::string added;
+  MemoryTextWriter out;
+  WriteStringTable(out, strings, "N");
+  EXPECT_EQ("", out.TakeText());
+  for (const auto& [text, bytes, names] : cases) {
+    WriteTypeByteCode(out, "A", strings, CodeOf(text));
+    EXPECT_EQ("static const vesk::octet_t A[] =\n{\n    " + bytes + "\n};\n", out.TakeText()) << text;
+    added += names;
+    WriteStringTable(out, strings, "N");
+    const std::string table = out.TakeText();
+    if (!added.empty()) EXPECT_EQ("static vesk::ConstStringZ N_stringTable[] =\n{\n" + added + "};\n", table) << text;
+  }
+}
+
+TEST_F(TypesTest, TypeOperations) {
+  MemoryTextWriter out;
+  WriteTypeOps(out, "T", 0);
+  EXPECT_EQ("sizeof(T),\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0\n", out.TakeText());
+  WriteTypeOps(out, "T", kOpsLess | kOpsCopy);
+  EXPECT_EQ(
+      "sizeof(T),\n0,\n(vesk::CompareVariableFn) (bool (*)(T const*, T const*)) vesk::VariableLess<T>,\n0,\n0,\n"
+      "(vesk::CopyConstructArrayFn) (void (*)(T*, vesk::ssize_t, T const*, vesk::ssize_t, vesk::ssize_t)) "
+      "vesk::CopyConstructArray<T>,\n"
+      "(vesk::AssignArrayFn) (void (*)(T*, vesk::ssize_t, T const*, vesk::ssize_t, vesk::ssize_t)) "
+      "vesk::AssignArray<T>,\n0,\n0,\n0,\n0,\n0,\n"
+      "(vesk::FindInArrayFn) (vesk::ssize_t (*)(T const*, vesk::ssize_t, vesk::ssize_t, T const*)) "
+      "vesk::BinaryLowerBound<T>,\n"
+      "(vesk::FindInArrayFn) (vesk::ssize_t (*)(T const*, vesk::ssize_t, vesk::ssize_t, T const*)) "
+      "vesk::BinaryUpperBound<T>\n",
+      out.TakeText());
 }
 
 }  // namespace
