@@ -9,12 +9,6 @@ namespace {
 constexpr char kChar8Code[] = {kOpChar8};
 constexpr char kChar16Code[] = {kOpChar16};
 
-std::string Declared(std::string_view type, std::string_view name) {
-  MemoryTextWriter text;
-  PrintDeclaration(text, type, name, DeclarationMode::ConstReference);
-  return text.TakeText();
-}
-
 // The negation of an unsigned value happens in the signed type of its width.
 std::string_view NegationCast(uint8_t op) {
   switch (op) {
@@ -133,7 +127,7 @@ void AttributeWriter::WriteOffset(const Scope& scope, std::string_view type, uin
   WriteText(m_out,
             "void operator+=($0) { $1->Offset$2($3$4); }\n"
             "void operator-=($0) { $1->Offset$2($3-$5$4); }\n",
-            {Declared(type, scope.member), scope.self, scope.accessor, WithComma(scope.Key()), scope.member,
+            {ConstReferenceText(type, scope.member), scope.self, scope.accessor, WithComma(scope.Key()), scope.member,
              NegationCast(op)});
 }
 
@@ -158,7 +152,7 @@ void AttributeWriter::WritePlain(const Scope& scope, std::string_view type, std:
   }
   if (scope.readOnly) return;
   WriteText(m_out, "void operator=($0) { $1->Set$2($3_v); }\n",
-            {Declared(type, "_v"), scope.self, scope.accessor, WithComma(scope.Key())});
+            {ConstReferenceText(type, "_v"), scope.self, scope.accessor, WithComma(scope.Key())});
 }
 
 void AttributeWriter::WriteVector(const Scope& scope, std::string_view element) {
@@ -249,8 +243,8 @@ void AttributeWriter::WriteForwarders(size_t first, size_t last, std::string_vie
   if ((decorators & kHasAssignable) || IsForwardedScalar(op)) {
     if (readOnly) return;
     WriteText(m_out, "void $0$1($2$3) { _self->$0$1($4_v); }\n",
-              {decorators & kHasOffsettable ? "Offset" : "Set", name, WithComma(parameters), Declared(type, "_v"),
-               WithComma(arguments)});
+              {decorators & kHasOffsettable ? "Offset" : "Set", name, WithComma(parameters),
+               ConstReferenceText(type, "_v"), WithComma(arguments)});
   } else if (IsVectorLike(op)) {
     if (readOnly) return;
     WriteText(m_out,

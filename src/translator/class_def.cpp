@@ -22,7 +22,7 @@ ClassDef::ClassDef(ScannedFile& owner, const char* position, ClassKind kind)
   traitsKind = kTraitsKinds[static_cast<size_t>(kind)];
 }
 
-std::string_view ClassDef::GetKeyword() const {
+std::string_view KeywordOf(ClassKind kind) {
   static constexpr std::string_view kWords[] = {"struct", "class", "adt", "mixin", "model"};
   return kWords[static_cast<size_t>(kind)];
 }
@@ -86,9 +86,10 @@ bool ClassDef::HasSerialise() const {
 
 bool ClassDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
 
-// A model may hold containers of its own class: while the answer is worked out, it counts as no.
+// A model may hold containers of its own class: while the answer is worked out, it counts as no. The traits may ask
+// ahead of a body that brings the model.
 bool ClassDef::AnyModelField(bool (*test)(std::string_view, NameSpace&), TriState& cache) const {
-  if (cache == TriState::Unset) {
+  if (cache == TriState::Unset && HasEmbeddedModel()) {
     cache = TriState::Off;
     for (const ModelField* field : m_modelFields) {
       if (!field->IsDropped() && test(field->m_type, *owner.rootNameSpace)) cache = TriState::On;

@@ -15,6 +15,7 @@ namespace qrex {
 class InterfaceDef;
 
 enum class ClassKind { Struct, Class, Adt, Mixin, Model };
+std::string_view KeywordOf(ClassKind kind);
 
 enum class TriState : uint8_t { Unset, Off, On };  // `-word` is off, `word` is on
 
@@ -47,7 +48,7 @@ class ClassDef : public NameSpaceElement, public TypeBehaviour {
  public:
   ClassDef(ScannedFile& owner, const char* position, ClassKind kind);
 
-  std::string_view GetKeyword() const override;
+  std::string_view GetKeyword() const override { return KeywordOf(kind); }
   std::string_view GetReflectedKindName() const override { return "Class"; }
   bool HaveSomethingToRegister() const override;
   void WriteReflectedDefinition(TextWriter& out) override;

@@ -51,11 +51,6 @@ class ClassStatement {
   ClassDef* m_def = nullptr;
 };
 
-std::string_view KeywordOf(ClassKind kind) {
-  static constexpr std::string_view kWords[] = {"struct", "class", "adt", "mixin", "model"};
-  return kWords[static_cast<size_t>(kind)];
-}
-
 void ClassStatement::ReadHeading() {
   m_parser.RequireIObjectImport();
   m_parser.Advance();

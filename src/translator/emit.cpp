@@ -42,22 +42,8 @@ std::string ExportPrefix(const NameSpaceElement& element) {
 
 std::string TargetIdentifier(const NameSpaceElement& element) { return element.owner.file.project->MangledProjDir(); }
 
-namespace {
-
-template <typename WriteOne>
-void WriteList(TextWriter& out, const std::vector<FunctionArg>& arguments, WriteOne writeOne) {
-  bool first = true;
-  for (const FunctionArg& argument : arguments) {
-    if (!first) out << ",";
-    first = false;
-    writeOne(argument);
-  }
-}
-
-}  // namespace
-
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments) {
-  WriteList(out, arguments, [&](const FunctionArg& argument) {
+  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) {
     PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
   });
 }
@@ -69,11 +55,11 @@ void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, co
 }
 
 void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments) {
-  WriteList(out, arguments, [&](const FunctionArg& argument) { PrintType(out, argument.type); });
+  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { PrintType(out, argument.type); });
 }
 
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments) {
-  WriteList(out, arguments, [&](const FunctionArg& argument) { out << argument.name; });
+  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { out << argument.name; });
 }
 
 void WriteReturn(TextWriter& out, const TypeCode& returnType) {
@@ -84,7 +70,7 @@ void WriteSignature(TextWriter& out, const FunctionSignature& signature) {
   if (signature.isInline) out << "inline ";
   PrintType(out, signature.returnType);
   out << " " << signature.name << "(";
-  WriteList(out, signature.arguments, [&](const FunctionArg& argument) {
+  WriteJoined(out, signature.arguments, ",", [&](const FunctionArg& argument) {
     PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
     if (!argument.defaultValue.empty()) out << "=" << argument.defaultValue;
   });

@@ -42,6 +42,17 @@ std::string TargetIdentifier(const NameSpaceElement& element);  // X: the projec
 inline std::string_view BoolText(bool value) { return value ? "true" : "false"; }
 inline char BitText(bool value) { return value ? '1' : '0'; }
 
+// Each item by `writeOne`, with the separator between them.
+template <typename Items, typename WriteOne>
+void WriteJoined(TextWriter& out, const Items& items, std::string_view separator, WriteOne writeOne) {
+  bool first = true;
+  for (const auto& item : items) {
+    if (!first) out << separator;
+    first = false;
+    writeOne(item);
+  }
+}
+
 // Argument lists, all without their parentheses.
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "T a,U b"
 void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments);         // "T,U"

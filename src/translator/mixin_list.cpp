@@ -35,7 +35,7 @@ class MixinList {
     std::string name = m_parser.Accept(kQuestion) ? ReadUnknown() : ReadKnown();
     if (m_parser.Is(kLess)) {
       const char* begin = m_parser.current.text.end;
-      m_parser.SkipToMatching(kLess, kGreater, "Met EOS before read matching angled bracket");
+      m_parser.SkipAngles("Met EOS before read matching angled bracket");
       m_arguments = std::string(begin, m_parser.current.text.begin);
       m_parser.Advance();
     }

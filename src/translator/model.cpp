@@ -19,17 +19,6 @@ std::vector<const ModelField*> NonDropped(const ClassDef& def) {
   return fields;
 }
 
-// Writes each item with `separator` between them.
-template <typename Items, typename WriteOne>
-void WriteJoined(TextWriter& out, const Items& items, std::string_view separator, WriteOne writeOne) {
-  bool first = true;
-  for (const auto& item : items) {
-    if (!first) out << separator;
-    first = false;
-    writeOne(item);
-  }
-}
-
 std::string TemplateArgs(const ClassDef& def) { return def.IsTemplate() ? "<" + def.m_templateArgNames + ">" : ""; }
 
 // The class that carries the functions of the model: N, or N_model where the class derives from a mixin that holds it.

@@ -9,12 +9,6 @@ namespace qrex {
 
 namespace {
 
-std::string Declared(std::string_view type, std::string_view name) {
-  MemoryTextWriter text;
-  PrintDeclaration(text, type, name, DeclarationMode::ConstReference);
-  return text.TakeText();
-}
-
 // One run over a model. Writing accessors either call the genop_ functions of the runtime (operations) or state a
 // barrier and touch the field.
 class AccessorWriter {
@@ -156,7 +150,7 @@ void AccessorWriter::WriteSet(std::string_view type, const std::string& name, co
     WriteText(m_out, "$0& Write$1($2) { $3 return $4; }\n",
               {TypeText(type), name, parameters, WriteBarrier(expression), expression});
   }
-  m_out << "void Set" << name << "(" << WithComma(parameters) << Declared(type, "_v") << ") { ";
+  m_out << "void Set" << name << "(" << WithComma(parameters) << ConstReferenceText(type, "_v") << ") { ";
   if (m_operations) {
     const std::string_view function = IsMovable(type)                 ? "genop_AssignPref"
                                       : NeedsVisitPrefs(type, m_root) ? "genop_Assign_VisitPrefs"
@@ -169,7 +163,7 @@ void AccessorWriter::WriteSet(std::string_view type, const std::string& name, co
 }
 
 void AccessorWriter::WriteOffset(std::string_view type, const std::string& name, const std::string& expression) {
-  m_out << "void Offset" << name << "(" << WithComma(m_path.Parameters()) << Declared(type, "_v") << ") { ";
+  m_out << "void Offset" << name << "(" << WithComma(m_path.Parameters()) << ConstReferenceText(type, "_v") << ") { ";
   if (m_operations) {
     m_out << GenopCall("genop_OffsetValue", name, expression, ",_v);");
   } else {

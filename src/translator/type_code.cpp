@@ -153,6 +153,12 @@ void PrintDeclaration(TextWriter& out, std::string_view code, std::string_view n
   if (!name.empty()) out << " " << name;
 }
 
+std::string ConstReferenceText(std::string_view code, std::string_view name) {
+  MemoryTextWriter text;
+  PrintDeclaration(text, code, name, DeclarationMode::ConstReference);
+  return text.TakeText();
+}
+
 std::string MangledType(std::string_view code) {
   code = SkipMetadata(code);
   const uint8_t op = Op(code);

@@ -106,6 +106,7 @@ enum class DeclarationMode { Plain, Reference, ConstReference };
 void PrintType(TextWriter& out, std::string_view code);
 std::string TypeText(std::string_view code);
 void PrintDeclaration(TextWriter& out, std::string_view code, std::string_view name, DeclarationMode mode);
+std::string ConstReferenceText(std::string_view code, std::string_view name);  // "T const& name"
 std::string MangledType(std::string_view code);
 std::string QualifiedDestructorText(std::string_view code);  // "vesk::xset<T>::~xset"; empty for a type without one
 

@@ -9,16 +9,6 @@ namespace qrex {
 
 namespace {
 
-template <typename Items, typename WriteOne>
-void WriteJoined(TextWriter& out, const Items& items, std::string_view separator, WriteOne writeOne) {
-  bool first = true;
-  for (const auto& item : items) {
-    if (!first) out << separator;
-    first = false;
-    writeOne(item);
-  }
-}
-
 // `prefix`: the variant and "::" in the out-of-class form.
 void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item, const std::string& prefix) {
   const std::string& name = item.name;

@@ -97,51 +97,25 @@ TEST_F(AccessorsTest, PathsOfASchema) {
 }
 
 TEST_F(AccessorsTest, WithOperations) {
-  const struct {
-    const char *field, *text;
-  } kFields[] = {
-      {"int32 x", R"(    void Setx(vesk::int32 const& _v) { vesk::genop_Assign(S,GetxPath(),_model_.x,_v); }
-)"},
-      {"pref<I> x",
-       R"(    void Setx(vesk::pref<I> const& _v) { vesk::genop_Assign_VisitPrefs(S,GetxPath(),_model_.x,_v); }
-)"},
-      {"movable<pref<I> > x",
-       R"(    void Setx(vesk::pref<I> const& _v) { vesk::genop_AssignPref(S,GetxPath(),_model_.x,_v); }
-)"},
-      {"assignable<xvector<int32> > x",
-       R"(    void Setx(vesk::xvector<vesk::int32> const& _v) { vesk::genop_Assign(S,GetxPath(),_model_.x,_v); }
-)"},
+  auto setter = [](const std::string& type, const std::string& operation) {
+    return "    void Setx(" + type + " const& _v) { vesk::" + operation + "(S,GetxPath(),_model_.x,_v); }\n";
+  };
+  auto ofVector = [](const std::string& element, const std::string& operation) {
+    return "    void CreateIntox(vesk::ssize_t _i," + element + " const* _src,vesk::ssize_t _n)\n    {\n" +
+           "        vesk::genop_CreateInto" + operation + "(S,GetxPath(),_model_.x,_i,_src,_n);\n    }\n" +
+           "    void DeleteFromx(vesk::ssize_t _i1,vesk::ssize_t _i2)\n    {\n" + "        vesk::genop_DeleteFrom" +
+           operation + "(S,GetxPath(),_model_.x,_i1,_i2);\n    }\n";
+  };
+  const std::pair<std::string, std::string> kFields[] = {
+      {"int32 x", setter("vesk::int32", "genop_Assign")},
+      {"pref<I> x", setter("vesk::pref<I>", "genop_Assign_VisitPrefs")},
+      {"movable<pref<I> > x", setter("vesk::pref<I>", "genop_AssignPref")},
+      {"assignable<xvector<int32> > x", setter("vesk::xvector<vesk::int32>", "genop_Assign")},
       {"offsettable<int8> x",
-       R"(    void Offsetx(vesk::int8 const& _v) { vesk::genop_OffsetValue(S,GetxPath(),_model_.x,_v); }
-)"},
-      {"string16 x", R"(    void CreateIntox(vesk::ssize_t _i,vesk::char16 const* _src,vesk::ssize_t _n)
-    {
-        vesk::genop_CreateIntoVector(S,GetxPath(),_model_.x,_i,_src,_n);
-    }
-    void DeleteFromx(vesk::ssize_t _i1,vesk::ssize_t _i2)
-    {
-        vesk::genop_DeleteFromVector(S,GetxPath(),_model_.x,_i1,_i2);
-    }
-)"},
-      {"xvector<pref<I> > x", R"(    void CreateIntox(vesk::ssize_t _i,vesk::pref<I> const* _src,vesk::ssize_t _n)
-    {
-        vesk::genop_CreateIntoVector_VisitPrefs(S,GetxPath(),_model_.x,_i,_src,_n);
-    }
-    void DeleteFromx(vesk::ssize_t _i1,vesk::ssize_t _i2)
-    {
-        vesk::genop_DeleteFromVector_VisitPrefs(S,GetxPath(),_model_.x,_i1,_i2);
-    }
-)"},
-      {"xvector<movable<pref<I> > > x",
-       R"(    void CreateIntox(vesk::ssize_t _i,vesk::pref<I> const* _src,vesk::ssize_t _n)
-    {
-        vesk::genop_CreateIntoMVector(S,GetxPath(),_model_.x,_i,_src,_n);
-    }
-    void DeleteFromx(vesk::ssize_t _i1,vesk::ssize_t _i2)
-    {
-        vesk::genop_DeleteFromMVector(S,GetxPath(),_model_.x,_i1,_i2);
-    }
-)"},
+       "    void Offsetx(vesk::int8 const& _v) { vesk::genop_OffsetValue(S,GetxPath(),_model_.x,_v); }\n"},
+      {"string16 x", ofVector("vesk::char16", "Vector")},
+      {"xvector<pref<I> > x", ofVector("vesk::pref<I>", "Vector_VisitPrefs")},
+      {"xvector<movable<pref<I> > > x", ofVector("vesk::pref<I>", "MVector")},
       {"xset<int8> x",
        R"(    static void GetxElementPath(vesk::Path& _path,vesk::int8 const& _k0) { vesk::octet_t* p=_path.InitLocalBuffer(2); p[0]=0; *(vesk::int8*)(p+1)=_k0; }
     static vesk::Path GetxElementPath(vesk::int8 const& _k0) { vesk::Path _path; GetxElementPath(_path,_k0); return _path; }

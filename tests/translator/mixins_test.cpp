@@ -102,17 +102,8 @@ TEST_F(MixinsTest, RecordOfAClassWithMixins) {
             "            { \"z\", offsetof(K,_model_.z), K_z, 0, -1 },\n");
 }
 
-TEST_F(MixinsTest, BasesAroundAList) {
-  EXPECT_EQ(
-      Section(TranslateHeader("$struct K : public B, C mixin [ ] D, E : [ 7 ] { };\n").header, "struct K__BASE", "\n{"),
-      " : public B, C {};\nstruct K;\n\nnamespace vesk");
-  EXPECT_EQ(
-      Section(TranslateHeader("$mixin M : B mixin [ ? X ] { };\n").header, "template <typename BC>\n", "\npublic"),
-      "struct M__BASE : BC,B {};\ntemplate <typename BC>\nstruct M : public X <M__BASE<BC> >\n\n{\n"
-      "    typedef X <M__BASE<BC> > BaseClass;\n ");
-}
-
 TEST_F(MixinsTest, AdtAndItsImplementation) {
+  MakeWorld(TargetType::DynamicLinkLibrary);
   const std::string adt = R"($adt+ A : [ 7 ]
 {
     int32 get(int32 i) const;
@@ -120,12 +111,12 @@ TEST_F(MixinsTest, AdtAndItsImplementation) {
 };
 )";
   EXPECT_EQ(Section(TranslateHeader(adt).header, "", "template<> struct ClassTypeTraits"), R"(struct A;
-vesk::ReflectedClass const& _GetReflected(A const*);
-vesk::TypeOps const& _GetTypeOps(A const*);
+app_API vesk::ReflectedClass const& _GetReflected(A const*);
+app_API vesk::TypeOps const& _GetTypeOps(A const*);
 
-vesk::int32 __stdcall get(A const* _self,vesk::int32 i);
+app_API vesk::int32 __stdcall get(A const* _self,vesk::int32 i);
 
-void __stdcall set(A* _self,vesk::string8 const& s);
+app_API void __stdcall set(A* _self,vesk::string8 const& s);
 
 namespace vesk
 {
@@ -156,7 +147,7 @@ int behind;
 
 public:
     
-    friend vesk::ReflectedClass const& _GetReflected(A const*);
+    friend app_API vesk::ReflectedClass const& _GetReflected(A const*);
 };
 
 inline vesk::int32 __stdcall get(A const* _self,vesk::int32 i) { return _self->get(i); }

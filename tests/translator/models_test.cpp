@@ -388,7 +388,7 @@ $struct+ S << multiline >> isa I : model
 
 )");
   const std::string tail = TranslateHeader(declarations).tail;
-  EXPECT_EQ(Section(tail, "    void S_model::", "\n    // Registration"),
+  EXPECT_EQ(Section(tail, "    void S_model::", "    void S::Serialise"),
             R"(VisitObjects(vesk::IObjectVisitor& _v) const {_v << p;}
     void S_model::VisitPrefs(vesk::IPrefVisitor& _v) const {_v << p;}
     void S_model::Serialise(vesk::Archive& _ar) const
@@ -401,17 +401,7 @@ $struct+ S << multiline >> isa I : model
         _ar >> this->p
            >> this->n;
     }
-    void S::Serialise(vesk::Archive& _ar) const
-    {
-        vesk::app_WriteDataSourceRsn(_ar);
-        _model_.Serialise(_ar);
-    }
-    void S::Deserialise(vesk::InputArchive& _ar)
-    {
-        vesk::app_ReadDataSourceRsn(_ar);
-        _model_.Deserialise(_ar);
-    }
-    )");
+)");
   EXPECT_EQ(Section(tail, "S_modelFields[] =\n", "};"),
             "        {\n            { \"p\", offsetof(S,_model_.p), S_p, 0, -1 },\n"
             "            { \"n\", offsetof(S,_model_.n), S_n, 0, -1 },\n        ");

@@ -137,16 +137,6 @@ TEST_F(RecordsTest, RegistriesFollowTheFiles) {
   EXPECT_TRUE(registry.dirty && registry.entries.empty());
 }
 
-TEST_F(RecordsTest, MainFile) {
-  EXPECT_EQ(
-      "int main();\n"
-      "\n\n\nvoid Register_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
-      "    s_called = true;\n}\n"
-      "\n\n\nvoid Unregister_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
-      "    s_called = true;\n}\n",
-      Translate("app.cpp", "int main();\n"));
-}
-
 TEST_F(RecordsTest, MainFileOfWindowsLibrary) {
   settings.systemName = "Windows";
   MakeWorld(TargetType::DynamicLinkLibrary);
