@@ -144,6 +144,7 @@ bool QrexParser::TranslateAt() {
 
 void QrexParser::OpenNameSpace() {
   Advance();
+  const char* const position = current.text.begin;
   std::string name;
   if (Is(kIdentifier)) {
     name = ReadIdentifier();
@@ -154,6 +155,7 @@ void QrexParser::OpenNameSpace() {
   if (!opened) {
     Fail("Can't open namespace " + name + " : " + PrintedElement(*Current().LookupLocal(name)) + " is not a namespace");
   }
+  if (!opened->position) opened->position = stream.SourcePosition(position);
   Expect(kOpenBrace, "{");
   m_nameSpaces.push_back(opened);
   m_savedDepths.push_back(m_braceDepth);

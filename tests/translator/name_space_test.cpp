@@ -91,15 +91,23 @@ TEST_F(LookUp, Ambiguity) {
 }
 
 TEST_F(NameSpaceTest, Conflicts) {
-  EXPECT_EQ("t.cpp(3) : error : $class A conflicts with previous declaration of $struct A",
-            Fault("\n$struct A;\n$class A;"));
-  EXPECT_EQ("t.cpp(2) : see declaration of $struct A\n", Messages());
-  MakeWorld(TargetType::Application);
-  EXPECT_EQ("t.cpp(1) : error : $struct E conflicts with previous declaration of $enum+ n::E",
-            Fault("namespace n { $enum+ E { x }; $struct E { }; }"));
-  MakeWorld(TargetType::Application);
-  EXPECT_EQ("t.cpp(2) : error : Repeated definition of $struct B", Fault("$struct B { };\n$struct B { };"));
-  EXPECT_EQ("t.cpp(1) : see declaration of $struct B\n", Messages());
+  const std::array<std::string, 3> cases[] = {
+      // the text, the error and where it sends the reader
+      {"\n$struct A;\n$class A;", "(3) : error : $class A conflicts with previous declaration of $struct A",
+       "(2) : see declaration of $struct A"},
+      {"namespace n { $enum+ E { x };\n$struct E { }; }",
+       "(2) : error : $struct E conflicts with previous declaration of $enum+ n::E",
+       "(1) : see declaration of $enum+ n::E"},
+      {"\nnamespace n { }\n$enum n { x };", "(3) : error : $enum n conflicts with previous declaration of $namespace n",
+       "(2) : see declaration of $namespace n"},
+      {"$struct B { };\n$struct B { };", "(2) : error : Repeated definition of $struct B",
+       "(1) : see declaration of $struct B"},
+  };
+  for (const auto& [text, error, place] : cases) {
+    MakeWorld(TargetType::Application);
+    EXPECT_EQ("t.cpp" + error, Fault(text));
+    EXPECT_EQ("t.cpp" + place + "\n", Messages());
+  }
 }
 
 // --- Qualifiers and `+`
