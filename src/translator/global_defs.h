@@ -21,7 +21,7 @@ class GlobalFunctionDef : public GlobalDef {
   std::string_view GetReflectedKindName() const override { return "GlobalFunction"; }
   bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined && m_registered; }
   void WriteReflectedDefinition(TextWriter& out) override;
-  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
+  DeclStatus GetDeclStatus() const override { return status; }
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
   bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(signature); }
 

@@ -1,7 +1,6 @@
 // Remote interfaces: the stub that marshals each call into an archive, and the skeleton (rmi) or scion (ipc) that
 // unmarshals a message and calls the object. Values travel in declared order, filtered by direction: the stub's `<<`
-// chain is the thunk's
-// `>>` chain, and the thunk's answer is what the stub's Result_ function reads.
+// chain is the thunk's `>>` chain, and the thunk's answer is what the stub's Result_ function reads.
 
 #include "translator/remote_interface.h"
 

@@ -9,8 +9,9 @@ class EnumsTest : public TranslateTest {};
 
 TEST_F(EnumsTest, ClassWithEveryPart) {
   MakeWorld(TargetType::DynamicLinkLibrary);
-  AssertGenerated("$enum+ class Level : [ \"doc\" ] { low, default -mid, high = 8 + 2, top, };\n",
-                  R"(class Level : public vesk::EnumBaseForRefinedLabels<Level>
+  const Generated generated =
+      TranslateHeader("$enum+ class Level : [ \"doc\" ] { low, default -mid, high = 8 + 2, top, };\n");
+  EXPECT_EQ(R"(class Level : public vesk::EnumBaseForRefinedLabels<Level>
 {
     public:
     enum Enum : int
@@ -60,20 +61,12 @@ TEST_F(EnumsTest, ClassWithEveryPart) {
 app_API vesk::ReflectedEnum const& _GetReflected(Level const*);
 inline vesk::TypeOps const& _GetTypeOps(Level const*) { return vesk::GetTypeOps<vesk::int32>(); }
 )" + TraitsText("Level", "enum", "1111") +
-                      "\n",
-                  R"(
-//### $enum+ Level
-namespace vesk { XTarget* app_GetXTarget(); }
-    app_API vesk::ReflectedEnum const& _GetReflected(Level const*)
+                "\n",
+            generated.header);
+  EXPECT_EQ(TailText("$enum+ Level", R"(    app_API vesk::ReflectedEnum const& _GetReflected(Level const*)
     {
-        static const vesk::octet_t Level_metadata[] =
-        {
-            0xe1,0xa4,0x00,0x00
-        };
-        static vesk::ConstStringZ Level_stringTable[] =
-        {
-            "doc",
-        };
+        static const vesk::octet_t Level_metadata[] = { 0xe1,0xa4,0x00,0x00 };
+        static vesk::ConstStringZ Level_stringTable[] = { "doc", };
         static const vesk::ReflectedEnum Level_enum =
         {
             "Level",
@@ -86,85 +79,53 @@ namespace vesk { XTarget* app_GetXTarget(); }
         };
         return Level_enum;
     }
-    
-    // Registration of $enum+ Level
-    void _Register_Level()
-    {
-        vxVerify(vesk::RegisterReflectedEnum(&_GetReflected( (Level*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);
-    }
-)");
+)") + RegistrationText("$enum+ Level", "Enum"),
+            WithTablesOnLines(generated.tail));
 }
 
-TEST_F(EnumsTest, PlainInNameSpaceReflectedButNotRegistered) {
-  AssertGenerated("namespace n { $enum E <<reflect>> { a, -b }; }\n", R"(namespace n { enum E : int
+TEST_F(EnumsTest, PlainReflectedButNotRegistered) {
+  const Generated generated = TranslateHeader("$enum E <<reflect>> { a, -b = 7 };\n");
+  EXPECT_EQ(R"(enum E : int
 {
-    a,
-    b
+    a=0,
+    b=7
 };
 vesk::ReflectedEnum const& _GetReflected(E const*);
 inline vesk::TypeOps const& _GetTypeOps(E const*) { return vesk::GetTypeOps<vesk::int32>(); }
 template<typename Archive> inline void Serialise(Archive& _ar,E _x) { vesk::SerialiseVariableLengthUint(_ar, (int)_x); }
 template<typename Archive> inline void Deserialise(Archive& _ar,E& _x) { vesk::DeserialiseVariableLengthUint(_ar, (int&)_x); }
-
-} //n
-namespace vesk
-{
-template<> struct TypeTraits<n::E>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_enum;
-    static const bool has_metadata = 0;
-};
-} // namespace vesk
-namespace n
-{
- }
-)",
-                  R"(
-//### $enum n::E
-namespace vesk { XTarget* app_GetXTarget(); }
-namespace n
-{
-    vesk::ReflectedEnum const& _GetReflected(E const*)
+)" + TraitsText("E", "enum", "0100") +
+                "\n",
+            generated.header);
+  EXPECT_EQ(TailText("$enum E", R"(    vesk::ReflectedEnum const& _GetReflected(E const*)
     {
-        static vesk::ConstStringZ E_strings[] =
-        {
-            "a",
-            "b",
-        };
-        static const bool E_enabled[] =
-        {
-            true,
-            false,
-        };
+        static vesk::ConstStringZ E_strings[] = { "a", "b", };
+        static const vesk::int32 E_values[] = { 0, 7, };
+        static const bool E_enabled[] = { true, false, };
         static const vesk::ReflectedEnum E_enum =
         {
-            "n::E",
+            "E",
             0,
             0,
             2,
             E_strings,
-            0,
+            E_values,
             E_enabled
         };
         return E_enum;
     }
-} // n
-)");
+)"),
+            WithTablesOnLines(generated.tail));
 }
 
 TEST_F(EnumsTest, WithoutLabels) {
-  const Generated generated = TranslateHeader("$enum class C { };\n$enum+ P <<-register>> { };\n");
+  const Generated generated = TranslateHeader("$enum class C { };\n$enum+ P <<-register extern>> { };\n");
   EXPECT_EQ("    {\n    };\n    C(Enum _v) : EnumBase(_v) {}\n    explicit C(int _v = 0) : EnumBase(_v) {}\n",
             Section(generated.header, "enum Enum : int\n", "    enum { LEN = 0 };\n"));
-  EXPECT_EQ("{\n};\nvesk::ReflectedEnum const& _GetReflected(P const*);\n",
-            Section(generated.header, "enum P : int\n", "inline"));
-  EXPECT_EQ(
-      "{\n            \"P\",\n            0,\n            0,\n            0,\n            0,\n            0,\n"
-      "            0\n        };\n        return P_enum;\n    }\n",
-      Section(generated.tail, "static const vesk::ReflectedEnum P_enum =\n        ", ""));
+  EXPECT_EQ("\nvesk::ReflectedEnum const& _GetReflected(P const*);\ninline vesk::TypeOps const& _GetTypeOps(P const*)",
+            Section(generated.header, "} // namespace vesk\n", " {"));
+  EXPECT_EQ("            0,\n            0,\n            0,\n            0,\n            0,\n            0\n",
+            Section(generated.tail, "            \"P\",\n", "        };\n"));
 }
 
 TEST_F(EnumsTest, Values) {

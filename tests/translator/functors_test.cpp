@@ -16,7 +16,8 @@ class FunctorsTest : public TranslateTest {
 };
 
 TEST_F(FunctorsTest, Class) {
-  AssertGenerated("$functor+ bool F(int32 a = 1, string8 const& b) : [ 7 ];\n", R"(class F
+  const Generated generated = TranslateHeader("$functor+ bool F(int32 a = 1, string8 const& b) : [ 7 ];\n");
+  EXPECT_EQ(R"(class F
 {
 public:
     typedef bool (__stdcall *STUB_FN)(void* _self,vesk::int32 a,vesk::string8 const& b);
@@ -41,33 +42,16 @@ private:
     STUB_FN m_stubFn;
 };
 inline vesk::xostream& operator<<(vesk::xostream& os, F f) { f.write(os); return os; }
-)" + TraitsText("F", "functor", "1111") + ";\n",
-                  R"(
-//### $functor+ F
-namespace vesk { XTarget* app_GetXTarget(); }
-    vesk::ReflectedFunctor const& _GetReflected(F const*)
+)" + TraitsText("F", "functor", "1111") +
+                ";\n",
+            generated.header);
+  EXPECT_EQ(TailText("$functor+ F", R"(    vesk::ReflectedFunctor const& _GetReflected(F const*)
     {
-        static const vesk::octet_t F_metadata[] =
-        {
-            0xe1,0xa2,0x07,0x00,0x00,0x00
-        };
-        static const vesk::octet_t F_return[] =
-        {
-            0x01
-        };
-        static const vesk::octet_t F_a[] =
-        {
-            0x04
-        };
-        static const vesk::octet_t F_b[] =
-        {
-            0x36,0x31,0x10
-        };
-        static const vesk::ReflectedArg F_args[] =
-        {
-            { "a", F_a },
-            { "b", F_b },
-        };
+        static const vesk::octet_t F_metadata[] = { 0xe1,0xa2,0x07,0x00,0x00,0x00 };
+        static const vesk::octet_t F_return[] = { 0x01 };
+        static const vesk::octet_t F_a[] = { 0x04 };
+        static const vesk::octet_t F_b[] = { 0x36,0x31,0x10 };
+        static const vesk::ReflectedArg F_args[] = { { "a", F_a }, { "b", F_b }, };
         static const vesk::ReflectedFunctor F_functor =
         {
             "F",
@@ -78,13 +62,8 @@ namespace vesk { XTarget* app_GetXTarget(); }
         };
         return F_functor;
     }
-    
-    // Registration of $functor+ F
-    void _Register_F()
-    {
-        vxVerify(vesk::RegisterReflectedFunctor(&_GetReflected( (F*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);
-    }
-)");
+)") + RegistrationText("$functor+ F", "Functor"),
+            WithTablesOnLines(generated.tail));
 }
 
 TEST_F(FunctorsTest, WithoutResultOrArguments) {

@@ -18,6 +18,15 @@ TEST_F(GlobalsTest, FunctionsInPlace) {
       "inline C* f()\n{\n    vesk::DollarNew(new C(1, $new D) ); return vesk::DollarNew(new a::B<int>(2))->c;\n}\n");
 }
 
+// A function may be declared in any number of files; its definition is found behind all of them.
+TEST_F(GlobalsTest, DeclarationsInSeveralFiles) {
+  for (const char* header : {"a.h", "b.h"}) Translate(header, "$function void f();\n");
+  EXPECT_EQ("#include \"a.h\"\n#include \"b.h\"\nvoid f();\nvoid f() { }\nvoid g(f* a) { }\n",
+            Translate("t.cpp",
+                      "@import \"a.h\"\n@import \"b.h\"\n$function void f();\n$function void f() { }\n"
+                      "$function void g(f* a) { }\n"));
+}
+
 TEST_F(GlobalsTest, FunctionRecord) {
   MakeWorld(TargetType::DynamicLinkLibrary);
   AddFile("t.cpp", R"(namespace n
@@ -40,31 +49,12 @@ namespace n
 {
     void _Register_Find()
     {
-        static const vesk::octet_t Find_metadata[] =
-        {
-            0xe1,0xa2,0x07,0x00,0x00,0x00
-        };
-        static const vesk::octet_t Find_return[] =
-        {
-            0x10
-        };
-        static const vesk::octet_t Find_arg_key[] =
-        {
-            0xe1,0xa4,0x00,0x00,0x04
-        };
-        static const vesk::octet_t Find_arg_more[] =
-        {
-            0x36,0x31,0x10
-        };
-        static const vesk::ReflectedArg Find_args[] =
-        {
-            { "key", Find_arg_key },
-            { "more", Find_arg_more },
-        };
-        static vesk::ConstStringZ Find_stringTable[] =
-        {
-            "k",
-        };
+        static const vesk::octet_t Find_metadata[] = { 0xe1,0xa2,0x07,0x00,0x00,0x00 };
+        static const vesk::octet_t Find_return[] = { 0x10 };
+        static const vesk::octet_t Find_arg_key[] = { 0xe1,0xa4,0x00,0x00,0x04 };
+        static const vesk::octet_t Find_arg_more[] = { 0x36,0x31,0x10 };
+        static const vesk::ReflectedArg Find_args[] = { { "key", Find_arg_key }, { "more", Find_arg_more }, };
+        static vesk::ConstStringZ Find_stringTable[] = { "k", };
         static const vesk::ReflectedGlobalFunction Find_function =
         {
             "n::Find",
@@ -97,7 +87,7 @@ namespace n
     }
 } // n
 )",
-            Translate("t.cpp"));
+            WithTablesOnLines(Translate("t.cpp")));
 }
 
 TEST_F(GlobalsTest, RecordsOnlyOfDefinedAndRegistered) {
@@ -164,19 +154,10 @@ TEST_F(GlobalsTest, Variables) {
   AssertHeader("$var int x[3] = {1,2,3};\n", "int x[3] = {1,2,3};\n");
   AssertHeader("$var DynArray<int32> a; $var xvector<int32> b[2][] = f(); $var string8 const& c = d;\n",
                "vesk::DynArray<vesk::int32> a; vesk::xvector<vesk::int32> b[2][] = f(); vesk::string8 const& c = d;\n");
-  AssertTail("$var+ vesk::pref<vesk::IObject> p[3];\n", R"(
-//### $var+ p
-namespace vesk { XTarget* app_GetXTarget(); }
-    void _Register_p()
+  EXPECT_EQ(TailText("$var+ p", R"(    void _Register_p()
     {
-        static const vesk::octet_t p_type[] =
-        {
-            0x50,0x03,0x00,0x00,0x00,0x42,0x21,0x00,0x00
-        };
-        static vesk::ConstStringZ p_stringTable[] =
-        {
-            "vesk::IObject",
-        };
+        static const vesk::octet_t p_type[] = { 0x50,0x03,0x00,0x00,0x00,0x42,0x21,0x00,0x00 };
+        static vesk::ConstStringZ p_stringTable[] = { "vesk::IObject", };
         static const vesk::ReflectedGlobalVariable p_var =
         {
             "p",
@@ -186,7 +167,8 @@ namespace vesk { XTarget* app_GetXTarget(); }
         };
         vxVerify(vesk::RegisterReflectedGlobalVariable(&p_var,vesk::app_GetXTarget()) == vesk::NSE_OK);
     }
-)");
+)"),
+            WithTablesOnLines(TranslateHeader("$var+ vesk::pref<vesk::IObject> p[3];\n").tail));
 }
 
 TEST_F(GlobalsTest, VariableErrors) {
@@ -212,22 +194,11 @@ inline vesk::ConstStringZ GetTypedefName_T()
 }
  }
 )");
-  AssertGenerated("$typedef+ <<extern>> xmap<int32,string8> T;\n", R"(;
-inline vesk::ConstStringZ GetTypedefName_T()
-{
-    return "T";
-}
-
-)",
-                  R"(
-//### $typedef+ T
-namespace vesk { XTarget* app_GetXTarget(); }
-    void _Register_T()
+  const Generated generated = TranslateHeader("$typedef+ <<extern>> xmap<int32,string8> T;\n");
+  EXPECT_EQ(";\ninline vesk::ConstStringZ GetTypedefName_T()\n{\n    return \"T\";\n}\n\n", generated.header);
+  EXPECT_EQ(TailText("$typedef+ T", R"(    void _Register_T()
     {
-        static const vesk::octet_t T_type[] =
-        {
-            0x51,0x04,0x10
-        };
+        static const vesk::octet_t T_type[] = { 0x51,0x04,0x10 };
         static const vesk::ReflectedTypedef T_typedef =
         {
             "T",
@@ -236,7 +207,8 @@ namespace vesk { XTarget* app_GetXTarget(); }
         };
         vxVerify(vesk::RegisterReflectedTypedef(&T_typedef,vesk::app_GetXTarget()) == vesk::NSE_OK);
     }
-)");
+)"),
+            WithTablesOnLines(generated.tail));
 }
 
 TEST_F(GlobalsTest, TypedefMessagesAndErrors) {

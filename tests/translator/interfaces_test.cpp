@@ -6,21 +6,19 @@ namespace {
 
 using InterfacesTest = TranslateTest;
 
-constexpr char kDiamond[] = R"($model Pos { bool y; };
-$interface+ A { void a(int32 i); };
+constexpr char kDiamond[] = R"($interface+ A { void a(int32 i); };
 $interface+ K : A { int32 k() const; };
 $interface+ L : A { };
-$interface+ D : K, L
+$interface+ D : [ "doc" ] : K, L
 {
     void d(const string8& s, int32 n=3);
     int32 v;
-    const xvector<int8> w;
-    Pos p;
 };
 )";
 
 TEST_F(InterfacesTest, DiamondWithAttributes) {
-  EXPECT_EQ(Section(TranslateHeader(kDiamond).header, "struct D\n", ""), R"({
+  const Generated generated = TranslateHeader(kDiamond);
+  EXPECT_EQ(Section(generated.header, "struct D\n", ""), R"({
     struct FnTable
     {
         K::FnTable _K;
@@ -28,10 +26,6 @@ TEST_F(InterfacesTest, DiamondWithAttributes) {
         void (__stdcall *d)(void* _self,vesk::string8 const& s,vesk::int32 n);
         vesk::int32 (__stdcall *Getv)(void const* _self);
         void (__stdcall *Setv)(void* _self,vesk::int32 v);
-        vesk::int32 (__stdcall *GetwSize)(void const* _self);
-        vesk::int8 (__stdcall *GetwElement)(void const* _self,vesk::int32 _k0);
-        bool (__stdcall *Getpy)(void const* _self);
-        void (__stdcall *Setpy)(void* _self,bool py);
     };
     D(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
     
@@ -43,10 +37,6 @@ TEST_F(InterfacesTest, DiamondWithAttributes) {
         static void __stdcall d(void* _self,vesk::string8 const& s,vesk::int32 n) { ((T*)_self)->d(s,n); }
         static vesk::int32 __stdcall Getv(void const* _self) { return ((const T*)_self)->Getv(); }
         static void __stdcall Setv(void* _self,vesk::int32 v) { ((T*)_self)->Setv(v); }
-        static vesk::int32 __stdcall GetwSize(void const* _self) { return ((const T*)_self)->GetwSize(); }
-        static vesk::int8 __stdcall GetwElement(void const* _self,vesk::int32 _k0) { return ((const T*)_self)->GetwElement(_k0); }
-        static bool __stdcall Getpy(void const* _self) { return ((const T*)_self)->Getpy(); }
-        static void __stdcall Setpy(void* _self,bool py) { ((T*)_self)->Setpy(py); }
         static const FnTable& GetTable()
         {
             static const FnTable t =
@@ -64,11 +54,7 @@ TEST_F(InterfacesTest, DiamondWithAttributes) {
                 },
                 &d,
                 &Getv,
-                &Setv,
-                &GetwSize,
-                &GetwElement,
-                &Getpy,
-                &Setpy
+                &Setv
             };
             return t;
         }
@@ -82,10 +68,6 @@ TEST_F(InterfacesTest, DiamondWithAttributes) {
     void d(vesk::string8 const& s,vesk::int32 n=3) { m_table->d(m_self,s,n); }
     vesk::int32 Getv() const { return m_table->Getv(m_self); }
     void Setv(vesk::int32 v) { m_table->Setv(m_self,v); }
-    vesk::int32 GetwSize() const { return m_table->GetwSize(m_self); }
-    vesk::int8 GetwElement(vesk::int32 _k0) const { return m_table->GetwElement(m_self,_k0); }
-    bool Getpy() const { return m_table->Getpy(m_self); }
-    void Setpy(bool py) { m_table->Setpy(m_self,py); }
     
     operator A() const { return A(m_self, &m_table->_K._A); }
     operator K() const { return K(m_self, &m_table->_K); }
@@ -98,22 +80,6 @@ TEST_F(InterfacesTest, DiamondWithAttributes) {
             operator vesk::int32() const { return CONST_ATTRIB_CAST(D,v)->Getv(); }
             void operator=(vesk::int32 const& _v) { ATTRIB_CAST(D,v)->Setv(_v); }
         } v;
-        struct
-        {
-            operator vesk::xvector<vesk::int8> const() const { return CONST_ATTRIB_CAST(D,w)->Getw(); }
-        } w;
-        struct
-        {
-            operator Pos() const { return CONST_ATTRIB_CAST(D,p)->Getp(); }
-            union
-            {
-                struct
-                {
-                    operator bool() const { return CONST_ATTRIB_CAST(D,p.y)->Getpy(); }
-                    void operator=(bool const& _v) { ATTRIB_CAST(D,p.y)->Setpy(_v); }
-                } y;
-            };
-        } p;
         void* m_self;
     };
     FnTable const* m_table;
@@ -124,10 +90,6 @@ struct DDelegatorMixin : public BC
     void d(vesk::string8 const& s,vesk::int32 n=3) { BC::GetD().d(s,n); }
     vesk::int32 Getv() const { return BC::GetD().Getv(); }
     void Setv(vesk::int32 v) { BC::GetD().Setv(v); }
-    vesk::int32 GetwSize() const { return BC::GetD().GetwSize(); }
-    vesk::int8 GetwElement(vesk::int32 _k0) const { return BC::GetD().GetwElement(_k0); }
-    bool Getpy() const { return BC::GetD().Getpy(); }
-    void Setpy(bool py) { BC::GetD().Setpy(py); }
 };
 
 vesk::ReflectedInterface const& _GetReflected(D const*);
@@ -140,7 +102,7 @@ template<> struct TypeTraits<D>
     static const bool is_reflected = 1;
     static const bool is_registered = 1;
     static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 0;
+    static const bool has_metadata = 1;
 };
 template<> struct InterfaceTypeTraits<D>
 {
@@ -153,105 +115,28 @@ template<> struct _is_indirect_superinterface_of<A,D> { static const bool value 
 } // namespace vesk
 
 )");
-  EXPECT_EQ(Section(TranslateHeader(kDiamond).tail, "_GetReflected(D const*)\n", "    \n    // Registration"), R"(    {
-        static vesk::ConstStringZ D_bases[] =
-        {
-            "K",
-            "L",
-        };
-        static const vesk::octet_t D_d_s[] =
-        {
-            0x36,0x31,0x10
-        };
-        static const vesk::octet_t D_d_n[] =
-        {
-            0x04
-        };
-        static const vesk::ReflectedArg D_d_args[] =
-        {
-            { "s", D_d_s },
-            { "n", D_d_n },
-        };
-        static const vesk::octet_t D_Getv_return[] =
-        {
-            0x04
-        };
-        static const vesk::octet_t D_Setv_v[] =
-        {
-            0x04
-        };
-        static const vesk::ReflectedArg D_Setv_args[] =
-        {
-            { "v", D_Setv_v },
-        };
-        static const vesk::octet_t D_GetwSize_return[] =
-        {
-            0x04
-        };
-        static const vesk::octet_t D_GetwElement_return[] =
-        {
-            0x02
-        };
-        static const vesk::octet_t D_GetwElement__k0[] =
-        {
-            0x04
-        };
-        static const vesk::ReflectedArg D_GetwElement_args[] =
-        {
-            { "_k0", D_GetwElement__k0 },
-        };
-        static const vesk::octet_t D_Getpy_return[] =
-        {
-            0x01
-        };
-        static const vesk::octet_t D_Setpy_py[] =
-        {
-            0x01
-        };
-        static const vesk::ReflectedArg D_Setpy_args[] =
-        {
-            { "py", D_Setpy_py },
-        };
-        static const vesk::octet_t D_v[] =
-        {
-            0x04
-        };
-        static const vesk::octet_t D_w[] =
-        {
-            0x31,0x44,0x02
-        };
-        static const vesk::octet_t D_p[] =
-        {
-            0x20,0x00,0x00
-        };
-        static const vesk::ReflectedAttribute D_attributes[] =
-        {
-            { "v",D_v },
-            { "w",D_w },
-            { "p",D_p },
-        };
-        static vesk::ConstStringZ D_stringTable[] =
-        {
-            "Pos",
-        };
-        static const vesk::ReflectedInterfaceMethod D_methods[] =
-        {
-            {"d",{0},D_d_args,2,0},
-            {"Getv",{D_Getv_return},0,0,0},
-            {"Setv",{0},D_Setv_args,1,0},
-            {"GetwSize",{D_GetwSize_return},0,0,0},
-            {"GetwElement",{D_GetwElement_return},D_GetwElement_args,1,0},
-            {"Getpy",{D_Getpy_return},0,0,0},
-            {"Setpy",{0},D_Setpy_args,1,0},
-        };
+  EXPECT_EQ(WithTablesOnLines(Section(generated.tail, "_GetReflected(D const*)\n", "    \n    // Registration")),
+            R"(    {
+        static const vesk::octet_t D_metadata[] = { 0xe1,0xa4,0x00,0x00 };
+        static vesk::ConstStringZ D_bases[] = { "K", "L", };
+        static const vesk::octet_t D_d_s[] = { 0x36,0x31,0x10 };
+        static const vesk::octet_t D_d_n[] = { 0x04 };
+        static const vesk::ReflectedArg D_d_args[] = { { "s", D_d_s }, { "n", D_d_n }, };
+        static const vesk::octet_t D_Getv_return[] = { 0x04 };
+        static const vesk::octet_t D_Setv_v[] = { 0x04 };
+        static const vesk::ReflectedArg D_Setv_args[] = { { "v", D_Setv_v }, };
+        static const vesk::octet_t D_v[] = { 0x04 };
+        static const vesk::ReflectedAttribute D_attributes[] = { { "v",D_v }, };
+        static vesk::ConstStringZ D_stringTable[] = { "doc", };
+        static const vesk::ReflectedInterfaceMethod D_methods[] = { {"d",{0},D_d_args,2,0}, {"Getv",{D_Getv_return},0,0,0}, {"Setv",{0},D_Setv_args,1,0}, };
         static const vesk::ReflectedInterface D_interface =
         {
             "D",
-            0,
+            D_metadata,
             D_bases,2,
             3,
-            D_methods,7,
-            D_attributes,3,
+            D_methods,3,
+            D_attributes,1,
             D_stringTable
         };
         return D_interface;

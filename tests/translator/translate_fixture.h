@@ -5,6 +5,7 @@
 #include <gtest/gtest.h>
 
 #include <algorithm>
+#include <cctype>
 #include <filesystem>
 #include <map>
 #include <memory>
@@ -176,6 +177,34 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     if (found == std::string::npos) return "'" + begin + "' is not in:\n" + text;
     const size_t start = found + begin.size();
     return text.substr(start, end.empty() ? end.npos : text.find(end, start) - start);
+  }
+
+  // With each table of a record on one line: "static T N[] = { row, row, };".
+  static std::string WithTablesOnLines(const std::string& text) {
+    std::string result;
+    size_t from = 0;
+    for (size_t at; (at = text.find("[] =\n", from)) != text.npos;) {
+      const size_t end = text.find("};", at);
+      for (; from < end; ++from) {
+        if (from < at || !std::isspace(static_cast<unsigned char>(text[from]))) {
+          result += text[from];
+        } else if (result.back() != ' ') {
+          result += ' ';
+        }
+      }
+    }
+    return result + text.substr(from);
+  }
+
+  // The tail of an element of the root name space; `record` is indented. `element`: as printed, "$enum+ E".
+  static std::string TailText(const std::string& element, const std::string& record) {
+    return "\n//### " + element + "\nnamespace vesk { XTarget* app_GetXTarget(); }\n" + record;
+  }
+  static std::string RegistrationText(const std::string& element, const std::string& kind) {
+    const std::string name = element.substr(element.find(' ') + 1);
+    return "    \n    // Registration of " + element + "\n    void _Register_" + name +
+           "()\n    {\n        vxVerify(vesk::RegisterReflected" + kind + "(&_GetReflected( (" + name +
+           "*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);\n    }\n";
   }
 
   // The TypeTraits block of an element of the root name space. `flags`: exported, reflected, registered, metadata.
