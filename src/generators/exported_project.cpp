@@ -72,7 +72,7 @@ void WriteExportedProject(Project& project) {
       PathJoin3(project.settings->exportUntranslatedInclude, project.sourceDir, project.name + ".qrpj");
   CreateDirectories(path, false);
   ChangeReadOnly(path, false);
-  WriteIfChanged(out, path);
+  WriteIfChanged(out, path, ReadOnlyTarget::Replace);
   ChangeReadOnly(path, true);
 }
 

@@ -9,7 +9,9 @@
 #include <algorithm>
 #include <boost/uuid/random_generator.hpp>
 #include <boost/uuid/uuid.hpp>
+#include <cerrno>
 #include <chrono>
+#include <csignal>
 #include <cstdlib>
 #include <ctime>
 #include <exception>
@@ -165,6 +167,8 @@ int RunCommand(const std::string& line) {
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
 
 uint64_t CurrentThreadId() { return static_cast<uint64_t>(gettid()); }
+uint64_t CurrentProcessId() { return static_cast<uint64_t>(getpid()); }
+bool IsProcessRunning(uint64_t id) { return kill(static_cast<pid_t>(id), 0) == 0 || errno == EPERM; }
 
 LocalTime CurrentLocalTime() {
   const timespec now = Now(CLOCK_REALTIME);

@@ -20,6 +20,8 @@ void SetEnvironment(const std::string& name, const std::string& value);
 constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
 
 uint64_t CurrentThreadId();
+uint64_t CurrentProcessId();
+bool IsProcessRunning(uint64_t id);
 struct LocalTime {
   int day, month, year, hour, minute, second, millisecond;
 };

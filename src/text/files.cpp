@@ -7,6 +7,7 @@
 #include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
+#include "text/numbers.h"
 
 namespace qrex {
 
@@ -60,7 +61,7 @@ bool CopyFile(const std::string& from, const std::string& to, bool failIfExists)
   }
   if (!platform::ReadFile(Checked(from), content)) return false;
   try {
-    ReplaceFile(to, content);
+    ReplaceFile(to, content, ReadOnlyTarget::Replace);
   } catch (const FileException& exception) {
     platform::SetLastError(exception.errorCode);
     return false;
@@ -142,16 +143,47 @@ bool LoadText(std::string& out, const std::string& path, bool foldLineEnds) {
   return true;
 }
 
-void ReplaceFile(const std::string& path, std::string_view content) {
+namespace {
+
+constexpr std::string_view kBesideMark = ".qrex-";  // then the process
+constexpr std::string_view kBesideEnd = ".part";
+
+// Whether the file was to be written by a process that is gone.
+bool IsLeftover(std::string_view name) {
+  if (!name.ends_with(kBesideEnd)) return false;
+  name.remove_suffix(kBesideEnd.size());
+  const size_t mark = name.rfind(kBesideMark);
+  if (mark == std::string_view::npos) return false;
+  uint64_t process;
+  std::string error;
+  return ParseNumber(std::string(name.substr(mark + kBesideMark.size())), process, error) &&
+         !platform::IsProcessRunning(process);
+}
+
+}  // namespace
+
+std::string BesidePath(const std::string& path) {
+  static std::unordered_set<std::string> sweptFolders;
+  const std::string folder = path.substr(0, path.rfind('/') + 1);
+  if (sweptFolders.insert(folder).second) {
+    for (const std::string& name : platform::PlainFileNames(folder)) {
+      if (IsLeftover(name)) platform::RemoveFile(folder + name);
+    }
+  }
+  return path + std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
+}
+
+void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly) {
   Checked(path);
-  if (platform::IsReadOnlyFile(path)) throw FileException(platform::kErrorAccessDenied, path);
-  const std::string beside = path + ".part";
+  if (readOnly == ReadOnlyTarget::Refuse && platform::IsReadOnlyFile(path)) {
+    throw FileException(platform::kErrorAccessDenied, path);
+  }
+  const std::string beside = BesidePath(path);
   auto fail = [&] {
     const uint32_t code = platform::LastError();
     platform::RemoveFile(beside);
     throw FileException(code, path);
   };
-  platform::RemoveFile(beside);  // a leftover of a run that was killed
   if (!platform::WriteFile(beside, content, false)) fail();
   if (!platform::RenameFile(beside, path)) fail();
 }

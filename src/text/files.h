@@ -29,7 +29,8 @@ class FileLookup {
   std::unordered_map<std::string, std::unordered_set<std::string>> m_plainFiles;  // by directory
 };
 bool DeleteFile(const std::string& path);
-bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);  // a program stays executable
+// A program stays executable; a read-only target is replaced like any other.
+bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);
 bool CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 bool SetReadOnly(const std::string& path, bool readOnly);
@@ -51,9 +52,14 @@ bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, w
 bool ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
 
+// The name of this process's own under which a file is written before it takes the place of `path`. The first call for
+// a folder removes what killed runs left there.
+std::string BesidePath(const std::string& path);
 // Replaces the file as a whole: written beside, then renamed, so that a half-written file never stands under `path`.
-// Raises FileException. A read-only target fails with code 5.
-void ReplaceFile(const std::string& path, std::string_view content);
+// Raises FileException. A read-only target fails with code 5, unless the flag is the caller's own: it was cleared, but
+// another run may just have set it again.
+enum class ReadOnlyTarget { Refuse, Replace };
+void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
 
 // A 16-byte header (magic, CRC-32 by IEEE 802.3, signed 64-bit size, all little-endian), then the payload.
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path);

@@ -25,7 +25,7 @@ std::string WithCarriageReturns(std::string_view text) {
 GeneratedFile::~GeneratedFile() {
   if (!m_isSpilled) return;
   m_beside.Close();
-  platform::RemoveFile(BesidePath());
+  platform::RemoveFile(m_besidePath);
 }
 
 void GeneratedFile::Write(const void* data, size_t length) {
@@ -42,8 +42,8 @@ void GeneratedFile::Write(const void* data, size_t length) {
 void GeneratedFile::Spill() {
   if (!m_isSpilled) {
     CreateDirectories(m_path, false);
-    platform::RemoveFile(BesidePath());  // a leftover of a run that was killed
-    if (!m_beside.Open(BesidePath(), FileMode::WriteBinary)) throw FileException(m_path);
+    m_besidePath = BesidePath(m_path);
+    if (!m_beside.Open(m_besidePath, FileMode::WriteBinary)) throw FileException(m_path);
     m_isSpilled = true;
   }
   m_beside.Write(m_text.data(), m_text.size());
@@ -55,20 +55,19 @@ std::string GeneratedFile::Text() {
   Spill();
   m_beside.Flush();
   std::string text;
-  ReadWholeFile(text, BesidePath());
+  ReadWholeFile(text, m_besidePath);
   return text;
 }
 
 void GeneratedFile::Commit() {
-  if (!m_isSpilled) return ReplaceFile(m_path, m_text);
+  if (!m_isSpilled) return ReplaceFile(m_path, m_text, ReadOnlyTarget::Replace);
   Spill();
   m_beside.Close();
-  if (platform::IsReadOnlyFile(m_path)) throw FileException(platform::kErrorAccessDenied, m_path);
-  if (!platform::RenameFile(BesidePath(), m_path)) throw FileException(m_path);
+  if (!platform::RenameFile(m_besidePath, m_path)) throw FileException(m_path);
   m_isSpilled = false;
 }
 
-int WriteIfChanged(MemoryTextWriter& writer, const std::string& path) {
+int WriteIfChanged(MemoryTextWriter& writer, const std::string& path, ReadOnlyTarget readOnly) {
   const std::string text = writer.TakeText(false);
   std::string old;
   if (LoadText(old, path, true) && old == text) {
@@ -77,7 +76,7 @@ int WriteIfChanged(MemoryTextWriter& writer, const std::string& path) {
   }
   TraceWriter() << "Writing " << path << "\n";
   try {
-    ReplaceFile(path, WithCarriageReturns(text));
+    ReplaceFile(path, WithCarriageReturns(text), readOnly);
   } catch (const FileException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
     return 0;

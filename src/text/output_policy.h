@@ -11,7 +11,7 @@ namespace qrex {
 
 // Writes the text with CR LF line ends unless the file holds it already (line ends folded): "Skipping " or "Writing "
 // and the path. A file that cannot be written costs an "Error: " line. 1 when written, else 0.
-int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);
+int WriteIfChanged(MemoryTextWriter& writer, const std::string& path, ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
 
 // The text with each line feed as CR LF: how every generated file stands on disk.
 std::string WithCarriageReturns(std::string_view text);
@@ -26,14 +26,14 @@ class GeneratedFile : public IOutputStream {
   void Write(const void* data, size_t length) override;  // raises FileException
   void Flush() override {}
   std::string Text();  // all that was written
-  void Commit();       // raises FileException. A read-only target fails with code 5
+  void Commit();       // raises FileException. A read-only target is replaced like any other
 
  private:
-  std::string BesidePath() const { return m_path + ".part"; }
   void Spill();
   const std::string m_path;
   std::string m_text;
   File m_beside;
+  std::string m_besidePath;
   bool m_isSpilled = false;
 };
 

@@ -2,6 +2,7 @@
 
 #include <cstring>
 
+#include "platform/error.h"
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
@@ -158,7 +159,8 @@ void Workspace::SyncProjectGuids() {
   try {
     if (ReadWholeFile(bytes, kGuidFile)) {
       guids = ParseGuids(bytes);
-    } else if (const FileException failure(kGuidFile); LastWriteTime(kGuidFile) != 0) {
+    } else if (const FileException failure(kGuidFile);
+               failure.errorCode != platform::kErrorFileNotFound && LastWriteTime(kGuidFile) != 0) {
       throw failure;  // it is there, but can't be read
     }
     for (const auto& project : projects) {

@@ -96,6 +96,10 @@ def files_of(*folders):
                   for folder, _, names in os.walk(top) for name in names)
 
 
+def leftovers():
+    return [path for path in files_of('.') if path.endswith('.part')]
+
+
 def contents(*folders):
     return {path: read(path) for path in files_of(*folders)}
 
@@ -333,7 +337,7 @@ def test_bad_input():
         write_tree(changes)
         text = run(status=0 if pieces == ['Completed'] else 1)
         holds(text, *pieces)
-        expect(not [path for path in files_of('.') if path.endswith('.part')], 'temporaries stay behind')
+        expect(not leftovers(), 'temporaries stay behind')
 
 
 def test_failed_project_among_the_workspaces():
@@ -474,7 +478,7 @@ def test_full_disk():
     text = run(status=1, limit=4096)
     holds(text, f'Error: File error ({TRANSLATED}c.h) : ')
     expect(not os.path.exists(TRANSLATED + 'c.h'), 'half-written')
-    expect(not [path for path in files_of('.') if path.endswith('.part')], 'temporaries stay behind')
+    expect(not leftovers(), 'temporaries stay behind')
     expect(dependencies()[0]['app/b.h'][1] != 0, 'what was finished is kept')
     run()
     whole = contents('qrexsource', 'out')
@@ -496,7 +500,7 @@ def test_full_disk_on_a_file_system():
         write_tree({'tree/app/c.h': 'int c;\n' * 20000})
         text = run(status=1)
         holds(text, f'Error: File error ({TRANSLATED}c.h) : There is not enough space on the disk.\n')
-        expect(not os.path.exists(TRANSLATED + 'c.h') and not os.path.exists(TRANSLATED + 'c.h.part'), 'half-written')
+        expect(not os.path.exists(TRANSLATED + 'c.h') and not leftovers(), 'half-written')
     finally:
         os.chdir('..')
         subprocess.run(['umount', 'small'])
@@ -538,15 +542,35 @@ def test_killed_at_any_point():
     expect(set(changed(before, times('.'))) <= EACH_RUN, 'and is complete')
 
 
-def test_stale_temporaries_are_harmless():
+def test_leftovers_of_killed_runs_are_removed():
     write_tree()
     run()
     wanted = without_times(contents('qrexsource', 'out'))
+    killed = subprocess.Popen(['true'])
+    killed.wait()
     for path in files_of('qrexsource', 'out') + ['projects.guids']:
-        write(path + '.part', JUNK)
+        write(f'{path}.qrex-{killed.pid}.part', JUNK)
+    others = [f'projects.guids.qrex-{os.getpid()}.part', 'projects.guids.part']  # of a run that goes on, of the user
+    for path in others:
+        write(path, JUNK)
     subprocess.run('find qrexsource out -type f ! -name "*.part" -delete', shell=True)
     run()
     expect(without_times(contents('qrexsource', 'out')) == wanted, contents('qrexsource', 'out').keys())
+    expect(sorted(leftovers()) == sorted(others), leftovers())
+
+
+def test_runs_at_the_same_time():
+    write_tree({'tree/app/c.h': 'int c;\n' * 100000})
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    for _ in range(4):
+        shutil.rmtree('qrexsource')
+        shutil.rmtree('out')
+        runs = [subprocess.Popen([BINARY, 'main.qrex'], stdout=subprocess.PIPE, text=True) for _ in range(4)]
+        for process in runs:
+            text = process.communicate()[0]
+            expect(process.returncode == 0 and 'rror' not in text and 'failed' not in text, text)
+        expect(without_times(contents('qrexsource', 'out')) == wanted and not leftovers(), leftovers())
 
 
 # --- With a compiler

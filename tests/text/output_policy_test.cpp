@@ -53,7 +53,7 @@ TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
       "Writing folder\nError: File error (folder) : Access is denied.\n",
       trace);
   EXPECT_EQ("old", Read("flagged"));
-  EXPECT_FALSE(FileExists("folder.part") || FileExists("flagged.part"));
+  EXPECT_FALSE(FileExists(BesidePath("folder")) || FileExists(BesidePath("flagged")));
 }
 
 TEST_F(OutputPolicyTest, CopiesWhatIsNewer) {
