@@ -48,15 +48,16 @@ bool ClassDef::ContainsMetaData() const {
 }
 
 const std::string& ClassDef::GetTemplateClassName() const {
-  if (m_templateClassName.empty()) {
-    m_templateClassName = IsTemplate() ? name + "<" + m_templateArgNames + ">" : name;
-  }
+  if (m_templateClassName.empty()) m_templateClassName = name + TemplateArgs();
   return m_templateClassName;
 }
 
-std::string ClassDef::TemplatePrefix() const {
-  if (IsMixin()) return IsTemplate() ? "template <typename BC," + m_templateArgList + ">" : "template <typename BC>";
-  return IsTemplate() ? "template <" + m_templateArgList + ">" : std::string();
+std::string ClassDef::TemplateArgs() const { return IsTemplate() ? "<" + m_templateArgNames + ">" : std::string(); }
+
+std::string ClassDef::TemplatePrefix(std::string_view behind) const {
+  if (!IsMixin() && !IsTemplate()) return {};
+  const char* const base = !IsMixin() ? "" : IsTemplate() ? "typename BC," : "typename BC";
+  return "template <" + (base + m_templateArgList + ">").append(behind);
 }
 
 bool ClassDef::CanBeCreated() const {

@@ -71,7 +71,9 @@ class ClassDef : public NameSpaceElement, public TypeBehaviour {
   std::string_view StructWord() const { return kind == ClassKind::Class ? "class " : "struct "; }
   const std::string& GetTemplateArgList() const { return m_templateArgList; }
   const std::string& GetTemplateClassName() const;  // N, or N<argument names>
-  std::string TemplatePrefix() const;               // "template <...>" or nothing; no blank behind it
+  std::string TemplateArgs() const;                 // <argument names> or nothing
+  // "template <...>" and what follows it; or nothing.
+  std::string TemplatePrefix(std::string_view behind = " ") const;
 
   // --- What it can do: each answer serves the traits, the TypeOps bits and the members alike
   bool CanBeCreated() const;

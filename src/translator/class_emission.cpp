@@ -59,7 +59,7 @@ void WriteGetReflectedClass(TextWriter& out, const ClassDef& def, std::string_vi
   out << "vesk::ReflectedClass const* " << scope << "GetReflectedClass() const\n";
   Block body(out);
   if (def.m_reflected) {
-    out << "return &_GetReflected( (" << QualifiedTemplateName(def) << "*) 0);\n";
+    out << "return &_GetReflected( (" << def.GetQualifiedName() << def.TemplateArgs() << "*) 0);\n";
   } else {
     out << "return NULL;\n";
   }
@@ -78,12 +78,8 @@ void WriteInterfaceMembers(TextWriter& out, const ClassDef& def) {
 
 }  // namespace
 
-std::string QualifiedTemplateName(const ClassDef& def) {
-  return def.GetQualifiedName() + (def.IsTemplate() ? "<" + def.m_templateArgNames + ">" : std::string());
-}
-
 void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def) {
-  const std::string scope = QualifiedTemplateName(def) + "::";
+  const std::string scope = def.GetQualifiedName() + def.TemplateArgs() + "::";
   WriteQueryInterface(out, def, scope);
   WriteGetReflectedClass(out, def, scope);
 }
@@ -180,9 +176,7 @@ void WriteAdtFunction(TextWriter& out, const ClassDef& def, const FunctionSignat
 
 void WriteClassOperators(TextWriter& out, const ClassDef& def) {
   const std::string& name = def.GetTemplateClassName();
-  std::string prefix = def.TemplatePrefix();
-  if (!prefix.empty()) prefix += " ";
-
+  const std::string prefix = def.TemplatePrefix();
   WriteVisitorOperators(out, def, prefix, name);
   if (def.WriteInsertionExtractionInTermsOfSerialise()) {
     WriteText(out,

@@ -15,8 +15,6 @@ void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def);  // QueryI
 void WriteGetReflected(TextWriter& out, const ClassDef& def);
 void WriteGetTypeOps(TextWriter& out, const ClassDef& def);
 
-void WriteTemplatePrefix(TextWriter& out, const ClassDef& def);  // with a blank behind it, or nothing
-std::string QualifiedTemplateName(const ClassDef& def);          // a::N, or a::N<argument names>
 bool HasCreateFunction(const ClassDef& def);
 
 }  // namespace qrex

@@ -188,9 +188,7 @@ bool ClassHead::WriteHead() {
       WriteTypeTraits(m_out, m_def);
       traitsWritten = true;
     }
-    const std::string prefix = m_def.TemplatePrefix();
-    if (!prefix.empty()) m_out << prefix << "\n";
-    m_out << m_def.StructWord();
+    m_out << m_def.TemplatePrefix("\n") << m_def.StructWord();
     if (!m_def.IsAdt()) m_out << ExportPrefix(m_def);
     m_out << m_def.name;
     if (m_isFinal && isDefinition) m_out << " final";

@@ -284,9 +284,7 @@ void ParseClass(QrexParser& parser, ClassKind kind, ClassDef* enclosing) {
 }
 
 void WriteForwardDeclaration(TextWriter& out, const ClassDef& def) {
-  const std::string prefix = def.TemplatePrefix();
-  if (!prefix.empty()) out << prefix << " ";
-  out << def.StructWord() << def.name << ";\n";
+  out << def.TemplatePrefix() << def.StructWord() << def.name << ";\n";
 }
 
 void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def) {

@@ -212,8 +212,7 @@ void WriteCreateInstance(TextWriter& out, const ClassDef& def) {
   auto found = std::find_if(def.m_interfaces.begin(), def.m_interfaces.end(),
                             [](const InterfaceDef* interface) { return interface->SubtypesIObject(); });
   const std::string interface = found == def.m_interfaces.end() ? std::string() : (*found)->GetQualifiedName();
-  WriteTemplatePrefix(out, def);
-  out << "vesk::ptr<vesk::IObject> __stdcall " << className << "::sfnCreateInstance()\n";
+  out << def.TemplatePrefix() << "vesk::ptr<vesk::IObject> __stdcall " << className << "::sfnCreateInstance()\n";
   Block body(out);
   out << "return static_cast<vesk::ptr<" << interface << "> >(new " << className << "());\n";
 }
@@ -222,17 +221,11 @@ void WriteCreateInstance(TextWriter& out, const ClassDef& def) {
 
 bool HasCreateFunction(const ClassDef& def) { return def.HasDefaultCtor() && def.m_implementsIObject; }
 
-void WriteTemplatePrefix(TextWriter& out, const ClassDef& def) {
-  const std::string prefix = def.TemplatePrefix();
-  if (!prefix.empty()) out << prefix << " ";
-}
-
 void WriteGetReflected(TextWriter& out, const ClassDef& def) { ClassRecord(out, def).Write(); }
 
 void WriteGetTypeOps(TextWriter& out, const ClassDef& def) {
-  out << ExportPrefix(def);
-  WriteTemplatePrefix(out, def);
-  out << "vesk::TypeOps const& _GetTypeOps(" << def.GetTemplateClassName() << " const*)\n";
+  out << ExportPrefix(def) << def.TemplatePrefix() << "vesk::TypeOps const& _GetTypeOps(" << def.GetTemplateClassName()
+      << " const*)\n";
   Block body(out);
   out << "return vesk::GetReflectedClass<" << def.GetTemplateClassName() << ">().m_ops;\n";
 }

@@ -19,8 +19,6 @@ std::vector<const ModelField*> NonDropped(const ClassDef& def) {
   return fields;
 }
 
-std::string TemplateArgs(const ClassDef& def) { return def.IsTemplate() ? "<" + def.m_templateArgNames + ">" : ""; }
-
 // The class that carries the functions of the model: N, or N_model where the class derives from a mixin that holds it.
 std::string ModelScope(const ClassDef& def) { return def.name + (def.m_inheritsModel ? "_model" : ""); }
 
@@ -221,8 +219,7 @@ void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place) {
   const auto fields = NonDropped(def);
   std::string heading = "void ";
   if (place == TextPlace::OutOfLine) {
-    const std::string prefix = def.TemplatePrefix();
-    heading = (prefix.empty() ? "" : prefix + " ") + "void " + ModelScope(def) + TemplateArgs(def) + "::";
+    heading = def.TemplatePrefix() + "void " + ModelScope(def) + def.TemplateArgs() + "::";
   }
   if (!def.GenerateOps()) {
     out << heading << "EvictDgsNodes() const {";
@@ -254,7 +251,7 @@ void WriteVisitingDeclarations(TextWriter& out, const ClassDef& def) {
 void WriteModelMixin(TextWriter& out, const ClassDef& def) {
   const ClassDef& model = def.m_referencedModel ? *def.m_referencedModel : def;
   const std::string mixin = def.name + "_model_mixin";
-  const std::string type = model.QualifiedModelStructName() + TemplateArgs(model);
+  const std::string type = model.QualifiedModelStructName() + model.TemplateArgs();
   const bool operations = def.GenerateOps() && model.qualifiers.genop != TriState::Off;
   out << "template <typename BC" << (def.IsTemplate() ? "," + def.m_templateArgList : "") << ">\n";
   out << "struct " << mixin << " : public BC\n";

@@ -130,11 +130,9 @@ TEST_F(LoopTest, LineTable) {
   EXPECT_EQ("none", SourceOf("never.h", 5));
   EXPECT_EQ("\nNOTE: Need @import instead of #include \"never.h\" to pinpoint errors in original source files\n",
             Messages());
-}
-
-TEST_F(LoopTest, LineTableOfEmptyFile) {
-  Translate("t.cpp", "");
-  EXPECT_EQ("none", SourceOf("t.cpp", 1));
+  trace.clear();
+  Translate("empty.cpp", "");
+  EXPECT_EQ("none", SourceOf("empty.cpp", 1));
   EXPECT_EQ("\nINTERNAL ERROR: convert error position failed because line number invalid\n", Messages());
 }
 

@@ -26,18 +26,6 @@ TEST_F(RecordsTest, NothingToRegister) {
   EXPECT_EQ("", TranslateHeader("$struct A { $int32 x; }; $type int8; $type+<<-register>> int16;").tail);
 }
 
-TEST_F(RecordsTest, CommonShape) {
-  AddProject("deep", "tools/deep", TargetType::Application);
-  Project& deep = *workspace->projects.back();
-  AddFileTo(deep, "tools/deep/src/d.cpp",
-            "namespace a {\nnamespace b { $enum+ E { x }; $enum+ F <<-register>> { y }; }\n}\n");
-  ScannedFile& file = host->GetScannedFile(*host->FindFile("tools/deep/src/d.cpp"));
-  file.needsWriting = true;
-  deep.CollectFiles();
-  file.WriteGeneratedFile();
-  EXPECT_EQ((std::vector<std::string>{"a::b::E"}), host->RegisterMap().entries["tools/deep/src/d.cpp"]);
-}
-
 TEST_F(RecordsTest, TypeRegistrations) {
   MakeWorld(TargetType::DynamicLinkLibrary);
   settings.systemName = "Linux";
@@ -101,12 +89,14 @@ TEST_F(RecordsTest, PlacesOfTails) {
   Reflect("free.h", "Free");
   Reflect("deep.h", "Deep");
   AddFile("mid.h", "@import \"deep.h\"\n$enum+ Mid { x };");
-  AddFile("own.cpp", "@import \"own.h\"\n@import \"free.h\"\n$enum+ Mine { x };");
+  AddFile("own.cpp",
+          "@import \"own.h\"\n@import \"free.h\"\n"
+          "namespace a {\nnamespace b { $enum+ E { x }; $enum+ F <<-register>> { y }; }\n}\n");
   AddFile("other.cpp", "@import \"mid.h\"\n@import \"own.h\"\n@import \"free.h\"\n");
-  EXPECT_EQ("$enum+ Own, $enum+ Free, $enum+ Mine", Registered(Translate("own.cpp")));
+  EXPECT_EQ("$enum+ Own, $enum+ Free, $enum+ a::b::E", Registered(Translate("own.cpp")));
   EXPECT_EQ("$enum+ Mid", Registered(Translate("other.cpp")));
   EXPECT_EQ("", Messages());
-  EXPECT_EQ((std::vector<std::string>{"Own", "Free", "Mine"}), host->RegisterMap().entries["app/src/own.cpp"]);
+  EXPECT_EQ((std::vector<std::string>{"Own", "Free", "a::b::E"}), host->RegisterMap().entries["app/src/own.cpp"]);
 }
 
 TEST_F(RecordsTest, HeaderOfSameNameNotImported) {
@@ -122,19 +112,6 @@ TEST_F(RecordsTest, ForeignHeadersAreNotRegistered) {
   AddFileTo(lib, "lib/x.h", "$enum+ X { x };");
   EXPECT_EQ("", Registered(Translate("t.cpp", "@import \"lib/x.h\"\n")));
   EXPECT_TRUE(host->RegisterMap().entries.empty());
-}
-
-TEST_F(RecordsTest, RegistriesFollowTheFiles) {
-  DeclarationRegistry registry(true);
-  registry.Update("a.cpp", {});
-  EXPECT_FALSE(registry.dirty);
-  registry.Update("a.cpp", {"X"});
-  EXPECT_TRUE(registry.dirty);
-  registry.dirty = false;
-  registry.Update("a.cpp", {"X"});
-  EXPECT_FALSE(registry.dirty);
-  registry.Update("a.cpp", {});
-  EXPECT_TRUE(registry.dirty && registry.entries.empty());
 }
 
 TEST_F(RecordsTest, MainFileOfWindowsLibrary) {
