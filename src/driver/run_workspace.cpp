@@ -3,6 +3,7 @@
 #include "build/project_builder.h"
 #include "generators/exported_project.h"
 #include "generators/generate.h"
+#include "platform/console.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
@@ -344,6 +345,10 @@ bool CheckPathSyntax(const ConfigSettings& settings) {
     }
     if (!path.empty() && path.back() == '/') {
       TraceWriter() << "Path can't end with a trailing slash in argument " << path << "\n";
+      return false;
+    }
+    if (!platform::IsValidUtf8(path)) {
+      TraceWriter() << "No valid UTF-8 in argument " << path << "\n";
       return false;
     }
     return true;

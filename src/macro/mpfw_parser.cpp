@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "lex/literals.h"
+#include "platform/console.h"
 #include "text/files.h"
 #include "text/paths.h"
 
@@ -62,11 +63,20 @@ void MpfwParser::ReadString(std::string& out) {
   SubstituteVariables(out);
 }
 
+namespace {
+
+void CheckPath(const std::string& path, const LexToken& token) {
+  if (path.find('\\') != std::string::npos) {
+    throw LexScannerException("Forward slashes must be used in " + Printed(token), token);
+  }
+  if (!platform::IsValidUtf8(path)) throw LexScannerException("Path is not valid UTF-8 : " + Printed(token), token);
+}
+
+}  // namespace
+
 void MpfwParser::ReadPath(std::string& out) {
   ReadString(out);
-  if (out.find('\\') != std::string::npos) {
-    throw LexScannerException("Forward slashes must be used in " + Printed(current), current);
-  }
+  CheckPath(out, current);
 }
 
 void MpfwParser::ReadStringOrExpression(std::string& out) {
@@ -98,9 +108,7 @@ void MpfwParser::ReadNamedPath(const std::string& name, std::string& out) {
   ReadNamedString(name, out);
   const LexToken path = current;
   Advance();
-  if (out.find('\\') != std::string::npos) {
-    throw LexScannerException("Forward slashes must be used in " + Printed(path), path);
-  }
+  CheckPath(out, path);
   if (!out.empty() && out.back() == '/') {
     throw LexScannerException("Path can't end with a trailing slash : " + Printed(path), path);
   }

@@ -1,5 +1,6 @@
 #include "driver/config_settings.h"
 
+#include "platform/console.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
@@ -28,6 +29,7 @@ void ApplyEnvironment(const PlatformEnvironment& environment) {
 
 bool FindImport(const ConfigSettings& settings, const std::string& path, std::string& found) {
   found = path;
+  if (!platform::IsValidUtf8(path)) return false;
   if (FileExists(found)) return true;
   for (const auto* directories : {&settings.context.importPaths, &settings.virtualTree}) {
     for (const std::string& directory : *directories) {

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "lex/literals.h"
+#include "platform/console.h"
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
@@ -116,10 +117,16 @@ void ProjectParser::Find(Search& search, const std::string& root, ProjectFolder&
   while (const IFileOrDirInfo* entry = entries.Next()) {
     const std::string name = entry->Name();
     if (name == "." || name == ".." || entry->IsHidden() || entry->IsSystem()) continue;
-    if (!entry->IsDirectory()) {
-      if (search.filter.Passes(name)) names.push_back(name);
-    } else if (search.recurse && m_directoryFilter.Passes(name)) {
+    const bool isWanted =
+        entry->IsDirectory() ? search.recurse && m_directoryFilter.Passes(name) : search.filter.Passes(name);
+    if (!isWanted) continue;
+    if (!platform::IsValidUtf8(name)) {
+      throw LexScannerException("Path is not valid UTF-8 : " + PathJoin(directory, name), current);
+    }
+    if (entry->IsDirectory()) {
       FindInSubdirectory(search, root, folder, directory, name);
+    } else {
+      names.push_back(name);
     }
   }
   for (const std::string& name : names) {

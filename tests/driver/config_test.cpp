@@ -143,8 +143,10 @@ TEST_F(ConfigTest, Messages) {
        }) {
     AssertFails(text, std::string("\nmain.qrex") + message + "\n");
   }
-  AssertFails("@import \"none\"",
-              "\nmain.qrex(1) : Couldn't open file none\n    while processing qrex config file : main.qrex\n");
+  for (const std::string path : {"none", "\xFF"}) {
+    AssertFails("@import \"" + path + "\"", "\nmain.qrex(1) : Couldn't open file " + path +
+                                                "\n    while processing qrex config file : main.qrex\n");
+  }
   EXPECT_FALSE(LoadConfiguration(Got(), "none.qrex", ""));
   EXPECT_FALSE(LoadConfiguration(Got(), ".", ""));
   EXPECT_EQ("Exception: Couldn't open file none.qrex\nException: Couldn't open file .\n",
@@ -217,6 +219,8 @@ TEST_F(ConfigTest, Validation) {
 
 TEST_F(ConfigTest, PathSyntax) {
   EXPECT_TRUE(CheckPathSyntax(settings));
+  settings.workspaces = {"w", "\xFF"};
+  EXPECT_FALSE(CheckPathSyntax(settings));
   settings.workspaces = {"w", "a/", "b\\"};
   EXPECT_FALSE(CheckPathSyntax(settings));
   settings.exportUntranslatedInclude = "u\\";
@@ -224,7 +228,8 @@ TEST_F(ConfigTest, PathSyntax) {
   settings.virtualTree = {"t\\/"};
   EXPECT_FALSE(CheckPathSyntax(settings));
   EXPECT_EQ(
-      "Path can't end with a trailing slash in argument a/\nForward slashes must be used in argument u\\\n"
+      "No valid UTF-8 in argument \xFF\nPath can't end with a trailing slash in argument a/\nForward slashes must be "
+      "used in argument u\\\n"
       "Forward slashes must be used in argument t\\/\n",
       trace);
 }

@@ -1,5 +1,7 @@
 // Project files: the model that comes of each statement and of the file tree, and every message.
 
+#include <fstream>
+
 #include "text/output_policy.h"
 #include "workspace/file_filter.h"
 #include "workspace/workspace_fixture.h"
@@ -195,6 +197,9 @@ TEST_F(ProjectTest, Searches) {
   AssertTree("{ \"s/c.h\" \"s/g.h\" \"*.h\" * }",
              "app/s/c.h=s/c.h app/s/g.h=s/g.h app/a.h app/f.h s{t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
   AssertTree("{ \"none\" { \"*\" * } }", "none{}");
+  std::ofstream("tree/app/s/\xFF.txt");
+  AssertTree("{ \"*.cpp\" * }", "app/b.cpp");
+  AssertError(std::string(kHeads) + "{ \"*\" * }", "(3) : Path is not valid UTF-8 : app/s/\xFF.txt");
 }
 
 TEST_F(ProjectTest, Patterns) {
@@ -246,6 +251,7 @@ TEST_F(ProjectTest, Messages) {
            {"config { \"a|b|c\" }", "(3) : Config specifier \"a|b|c\" must be of the form name|platform"},
            {"config {\n\"a|b\" [ x ] }", "(4) : Expected quoted string when read x"},
            {"subproj { \"a\\\\b\" }", "(3) : Forward slashes must be used in \"a\\\\b\""},
+           {"{\n\"a\xFF\" }", "(4) : Path is not valid UTF-8 : \"a\xFF\""},
            {"toolfiles {\n\"a\\\\b\" }", "(4) : Forward slashes must be used in \"a\\\\b\""},
            {"prelinkevent { \"a\" }", "(3) : Expected quoted string when read }"},
            {"prelinkevent { \"a\" \"b\" \"c\" }", "(3) : Expected } after \"b\" when read \"c\""},
