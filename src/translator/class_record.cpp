@@ -111,15 +111,10 @@ void ClassRecord::WriteModelFields() {
 
 void ClassRecord::WriteMethodRow(const FunctionSignature& method) {
   const std::string prefix = m_name + "_" + method.name;
-  m_out << "{\"" << method.name << "\",{";
-  if (IsVoid(method.returnType)) {
-    m_out << "0},";
-  } else {
-    m_out << prefix << "_return},";
-  }
-  WriteCountedName(m_out, method.arguments.size(), prefix + "_args");
-  WriteNameOrZero(m_out, !method.metadata.empty(), prefix + "_metadata");
-  m_out << BoolText(method.isConst) << ",(vesk::FunctionPointer)(";
+  m_out << "{\"" << method.name << "\",{" << NameOrZero(!IsVoid(method.returnType), prefix + "_return") << "},";
+  m_out << CountedName(method.arguments.size(), prefix + "_args") << ","
+        << NameOrZero(!method.metadata.empty(), prefix + "_metadata") << "," << BoolText(method.isConst)
+        << ",(vesk::FunctionPointer)(";
   PrintType(m_out, method.returnType);
   m_out << " (__stdcall *)(";
   WriteSelfAndArgDeclarations(m_out, m_name, method);
@@ -161,8 +156,7 @@ uint32_t ClassRecord::Flags() const {
 }
 
 void ClassRecord::WriteTableRow(size_t count, std::string_view suffix) {
-  WriteCountedName(m_out, count, m_name + std::string(suffix));
-  m_out << "\n";
+  m_out << CountedName(count, m_name + std::string(suffix)) << ",\n";
 }
 
 void ClassRecord::WriteRecord() {
@@ -172,23 +166,19 @@ void ClassRecord::WriteRecord() {
   m_out << Flags() << ",\n";
   m_out << "\"" << m_def.GetQualifiedName() << "\",\n";
   m_out << "sizeof(" << className << "),\n";
-  WriteNameOrZero(m_out, !m_def.metadata.empty(), m_name + "_metadata");
-  m_out << "\n";
+  m_out << NameOrZero(!m_def.metadata.empty(), m_name + "_metadata") << ",\n";
   WriteTableRow(m_fieldCount, "_fields");
   WriteTableRow(m_modelFieldCount, "_modelFields");
   WriteTableRow(m_depFieldCount, "_depfields");
   WriteTableRow(m_def.m_methods.size(), "_methods");
-  WriteNameOrZero(m_out, !m_strings.Empty(), m_name + "_stringTable");
-  m_out << "\n";
+  m_out << NameOrZero(!m_strings.Empty(), m_name + "_stringTable") << ",\n";
   if (m_def.m_interfaces.empty()) {
     m_out << "0,0,0,\n";
   } else {
     m_out << m_name << "_interfaces," << m_flattened.size() << "," << m_def.m_interfaces.size() << ",\n";
   }
-  WriteNameOrZero(m_out, m_def.m_implementsIObject, "&vesk::IObject::Stubs<" + className + ">::GetTable()");
-  m_out << "\n";
-  WriteNameOrZero(m_out, HasCreateFunction(m_def), "&" + className + "::sfnCreateInstance");
-  m_out << "\n";
+  m_out << NameOrZero(m_def.m_implementsIObject, "&vesk::IObject::Stubs<" + className + ">::GetTable()") << ",\n";
+  m_out << NameOrZero(HasCreateFunction(m_def), "&" + className + "::sfnCreateInstance") << ",\n";
   Block ops(m_out);
   WriteTypeOps(m_out, m_name, m_def.TypeOpsBits());
 }

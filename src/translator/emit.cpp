@@ -77,16 +77,10 @@ void WriteSignature(TextWriter& out, const FunctionSignature& signature) {
   out << (signature.isConst ? ") const" : ")");
 }
 
-void WriteNameOrZero(TextWriter& out, bool present, std::string_view name) {
-  out << (present ? name : std::string_view("0")) << ",";
-}
+std::string NameOrZero(bool present, const std::string& name) { return present ? name : "0"; }
 
-void WriteCountedName(TextWriter& out, size_t count, std::string_view name) {
-  if (count == 0) {
-    out << "0,0,";
-  } else {
-    out << name << "," << count << ",";
-  }
+std::string CountedName(size_t count, const std::string& name) {
+  return count == 0 ? "0,0" : name + "," + std::to_string(count);
 }
 
 void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments) {

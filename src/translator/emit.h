@@ -64,9 +64,9 @@ void WriteReturn(TextWriter& out, const TypeCode& returnType);                  
 // "inline T name(T a=1,U b) const": a signature as C++.
 void WriteSignature(TextWriter& out, const FunctionSignature& signature);
 
-// Rows of records: "NAME," or "0,"; "NAME,count," or "0,0,".
-void WriteNameOrZero(TextWriter& out, bool present, std::string_view name);
-void WriteCountedName(TextWriter& out, size_t count, std::string_view name);
+// Pieces of records: "NAME" or "0"; "NAME,count" or "0,0".
+std::string NameOrZero(bool present, const std::string& name);
+std::string CountedName(size_t count, const std::string& name);
 
 // Fixed multi-line text: each `$0`..`$9` of the text is replaced by the argument of that index.
 void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments);

@@ -241,21 +241,19 @@ void EnumDef::WriteReflectedDefinition(TextWriter& out) {
     if (!m_values.empty()) WriteTable(out, *this, "const vesk::int32", name + "_values", "", WriteValueRows);
     if (HasDisabledLabel()) WriteTable(out, *this, "const bool", name + "_enabled", "", WriteEnabledRows);
   }
-  auto table = [&](bool present, std::string_view function, std::string_view array) {
-    return !present ? std::string("0") : m_isClass ? name + std::string(function) : name + std::string(array);
+  auto table = [&](std::string_view function, std::string_view array) {
+    return name + std::string(m_isClass ? function : array);
   };
   out << "static const vesk::ReflectedEnum " << name << "_enum =\n";
   {
     Block record(out, ";");
     out << "\"" << GetQualifiedName() << "\",\n";
-    WriteNameOrZero(out, !metadata.empty(), name + "_metadata");
-    out << "\n";
-    WriteNameOrZero(out, !strings.Empty(), name + "_stringTable");
-    out << "\n";
+    out << NameOrZero(!metadata.empty(), name + "_metadata") << ",\n";
+    out << NameOrZero(!strings.Empty(), name + "_stringTable") << ",\n";
     out << m_labels.size() << ",\n";
-    out << table(hasLabels, "::stringArray()", "_strings") << ",\n";
-    out << table(!m_values.empty(), "::valueArray()", "_values") << ",\n";
-    out << table(HasDisabledLabel(), "::enabledArray()", "_enabled") << "\n";
+    out << NameOrZero(hasLabels, table("::stringArray()", "_strings")) << ",\n";
+    out << NameOrZero(!m_values.empty(), table("::valueArray()", "_values")) << ",\n";
+    out << NameOrZero(HasDisabledLabel(), table("::enabledArray()", "_enabled")) << "\n";
   }
   out << "return " << name << "_enum;\n";
 }

@@ -219,14 +219,7 @@ void FunctorDef::WriteReflectedDefinition(TextWriter& out) {
   out << "static const vesk::ReflectedFunctor " << name << "_functor =\n";
   {
     Block record(out, ";");
-    out << "\"" << GetQualifiedName() << "\",\n";
-    out << "{" << (IsVoid(signature.returnType) ? "0" : name + "_return") << "},\n";
-    WriteCountedName(out, signature.arguments.size(), name + "_args");
-    out << "\n";
-    WriteNameOrZero(out, !metadata.empty(), name + "_metadata");
-    out << "\n";
-    WriteNameOrZero(out, !strings.Empty(), name + "_stringTable");
-    out << "\n";
+    WriteSignatureRows(out, *this, signature, strings);
   }
   out << "return " << name << "_functor;\n";
 }

@@ -246,37 +246,16 @@ void WriteRegister(TextWriter& out, const NameSpaceElement& element, std::string
       << ",vesk::" << TargetIdentifier(element) << "_GetXTarget()) == vesk::NSE_OK);\n";
 }
 
-std::string StringTableOrZero(const StringTable& strings, const std::string& name) {
-  return strings.Empty() ? "0" : name + "_stringTable";
-}
-
 }  // namespace
 
 void GlobalFunctionDef::WriteReflectedDefinition(TextWriter& out) {
   StringTable strings;
-  if (!metadata.empty()) WriteMetadataByteCode(out, name + "_metadata", strings, metadata);
-  if (!IsVoid(signature.returnType)) WriteTypeByteCode(out, name + "_return", strings, signature.returnType);
-  for (const FunctionArg& argument : signature.arguments) {
-    WriteTypeByteCode(out, name + "_arg_" + argument.name, strings, argument.type);
-  }
-  if (!signature.arguments.empty()) {
-    out << "static const vesk::ReflectedArg " << name << "_args[] =\n";
-    Block rows(out, ";");
-    for (const FunctionArg& argument : signature.arguments) {
-      WriteText(out, "{ \"$1\", $0_arg_$1 },\n", {name, argument.name});
-    }
-  }
+  WriteSignatureArrays(out, name, signature, strings, "_arg_");
   WriteStringTable(out, strings, name);
   out << "static const vesk::ReflectedGlobalFunction " << name << "_function =\n";
   {
     Block record(out, ";");
-    out << "\"" << GetQualifiedName() << "\",\n";
-    out << "{" << (IsVoid(signature.returnType) ? "0" : name + "_return") << "},\n";
-    WriteCountedName(out, signature.arguments.size(), name + "_args");
-    out << "\n";
-    WriteNameOrZero(out, !metadata.empty(), name + "_metadata");
-    out << "\n";
-    out << StringTableOrZero(strings, name) << ",\n";
+    WriteSignatureRows(out, *this, signature, strings);
     out << "(vesk::FunctionPointer)(";
     PrintType(out, signature.returnType);
     out << " (*)(";
@@ -294,7 +273,7 @@ void GlobalVarDef::WriteReflectedDefinition(TextWriter& out) {
   {
     Block record(out, ";");
     out << "\"" << GetQualifiedName() << "\",\n&" << name << ",\n" << name << "_type,\n";
-    out << StringTableOrZero(strings, name) << "\n";
+    out << NameOrZero(!strings.Empty(), name + "_stringTable") << "\n";
   }
   WriteRegister(out, *this, "_var");
 }
@@ -307,7 +286,7 @@ void TypedefDef::WriteReflectedDefinition(TextWriter& out) {
   {
     Block record(out, ";");
     out << "\"" << GetQualifiedName() << "\",\n" << name << "_type,\n";
-    out << StringTableOrZero(strings, name) << "\n";
+    out << NameOrZero(!strings.Empty(), name + "_stringTable") << "\n";
   }
   WriteRegister(out, *this, "_typedef");
 }

@@ -226,27 +226,22 @@ class InterfaceRecord {
     Block rows(m_out, ";");
     for (const FunctionSignature& method : m_interface.m_methods) {
       const std::string prefix = m_name + "_" + method.name;
-      m_out << "{\"" << method.name << "\",{" << (IsVoid(method.returnType) ? "0" : prefix + "_return") << "},";
-      WriteCountedName(m_out, method.arguments.size(), prefix + "_args");
-      m_out << (method.metadata.empty() ? "0" : prefix + "_metadata") << "},\n";
+      m_out << "{\"" << method.name << "\",{" << NameOrZero(!IsVoid(method.returnType), prefix + "_return") << "},"
+            << CountedName(method.arguments.size(), prefix + "_args") << ","
+            << NameOrZero(!method.metadata.empty(), prefix + "_metadata") << "},\n";
     }
   }
 
   void WriteInterface() {
     m_out << "static const vesk::ReflectedInterface " << m_name << "_interface =\n";
     Block record(m_out, ";");
-    auto counted = [&](size_t count, std::string_view suffix) {
-      WriteCountedName(m_out, count, m_name + std::string(suffix));
-      m_out << "\n";
-    };
     m_out << "\"" << m_interface.GetQualifiedName() << "\",\n";
-    WriteNameOrZero(m_out, !m_interface.metadata.empty(), m_name + "_metadata");
-    m_out << "\n";
-    counted(m_interface.m_bases.size(), "_bases");
+    m_out << NameOrZero(!m_interface.metadata.empty(), m_name + "_metadata") << ",\n";
+    m_out << CountedName(m_interface.m_bases.size(), m_name + "_bases") << ",\n";
     m_out << m_interface.InheritedMethodCount() << ",\n";
-    counted(m_interface.m_methods.size(), "_methods");
-    counted(m_interface.m_attributes.size(), "_attributes");
-    m_out << (m_strings.Empty() ? "0" : m_name + "_stringTable") << "\n";
+    m_out << CountedName(m_interface.m_methods.size(), m_name + "_methods") << ",\n";
+    m_out << CountedName(m_interface.m_attributes.size(), m_name + "_attributes") << ",\n";
+    m_out << NameOrZero(!m_strings.Empty(), m_name + "_stringTable") << "\n";
   }
 
   TextWriter& m_out;

@@ -28,18 +28,28 @@ void WriteRegistration(TextWriter& out, const NameSpaceElement& element, Registr
 }
 
 void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const FunctionSignature& signature,
-                          StringTable& strings) {
+                          StringTable& strings, std::string_view infix) {
   if (!signature.metadata.empty()) WriteMetadataByteCode(out, prefix + "_metadata", strings, signature.metadata);
   if (!IsVoid(signature.returnType)) WriteTypeByteCode(out, prefix + "_return", strings, signature.returnType);
   for (const FunctionArg& argument : signature.arguments) {
-    WriteTypeByteCode(out, prefix + "_" + argument.name, strings, argument.type);
+    WriteTypeByteCode(out, prefix + std::string(infix) + argument.name, strings, argument.type);
   }
   if (signature.arguments.empty()) return;
   out << "static const vesk::ReflectedArg " << prefix << "_args[] =\n";
   Block rows(out, ";");
   for (const FunctionArg& argument : signature.arguments) {
-    WriteText(out, "{ \"$1\", $0_$1 },\n", {prefix, argument.name});
+    WriteText(out, "{ \"$2\", $0$1$2 },\n", {prefix, infix, argument.name});
   }
+}
+
+void WriteSignatureRows(TextWriter& out, const NameSpaceElement& element, const FunctionSignature& signature,
+                        const StringTable& strings) {
+  const std::string& name = element.name;
+  out << "\"" << element.GetQualifiedName() << "\",\n";
+  out << "{" << NameOrZero(!IsVoid(signature.returnType), name + "_return") << "},\n";
+  out << CountedName(signature.arguments.size(), name + "_args") << ",\n";
+  out << NameOrZero(!element.metadata.empty(), name + "_metadata") << ",\n";
+  out << NameOrZero(!strings.Empty(), name + "_stringTable") << ",\n";
 }
 
 void NameSpaceElement::WriteReflection(TextWriter& out, RegistrationLists& lists) {

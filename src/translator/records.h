@@ -20,7 +20,10 @@ void WriteRegistration(TextWriter& out, const NameSpaceElement& element, Registr
 
 // The byte code arrays of a signature, PREFIX_metadata, PREFIX_return, PREFIX_arg each, and the table PREFIX_args.
 void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const FunctionSignature& signature,
-                          StringTable& strings);
+                          StringTable& strings, std::string_view infix = "_");
+// What the records of functors and functions tell of these, from the qualified name to the string table.
+void WriteSignatureRows(TextWriter& out, const NameSpaceElement& element, const FunctionSignature& signature,
+                        const StringTable& strings);
 
 // --- At the place of a declaration: closes the open name spaces, writes the TypeTraits block, reopens them.
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element);

@@ -301,12 +301,9 @@ void VariantDef::WriteReflectedDefinition(TextWriter& out) {
     {
       Block record(out, ";");
       out << "\"" << GetQualifiedName() << "\",\nsizeof(" << name << "),\n";
-      WriteNameOrZero(out, !metadata.empty(), name + "_metadata");
-      out << "\n";
-      WriteCountedName(out, m_items.size(), name + "_fields");
-      out << "\n";
-      WriteNameOrZero(out, !strings.Empty(), name + "_stringTable");
-      out << "\n";
+      out << NameOrZero(!metadata.empty(), name + "_metadata") << ",\n";
+      out << CountedName(m_items.size(), name + "_fields") << ",\n";
+      out << NameOrZero(!strings.Empty(), name + "_stringTable") << ",\n";
       Block ops(out);
       WriteTypeOps(out, name, TypeOpsBits());
     }
