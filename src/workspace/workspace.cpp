@@ -32,8 +32,11 @@ std::string ProjectPathOf(const std::string& entry) {
 Workspace::Workspace(ConfigSettings& settings) : settings(settings), context(settings.context) {}
 
 Project* Workspace::FindProjectByName(std::string_view projectName) const {
+  if (const auto known = m_found.find(projectName); known != m_found.end()) return known->second;
   for (const auto& project : projects) {
-    if (project->name == projectName) return project.get();
+    if (project->name != projectName) continue;
+    if (!projectName.empty()) m_found.emplace(project->name, project.get());  // one without a name may get it yet
+    return project.get();
   }
   return nullptr;
 }
@@ -118,6 +121,7 @@ void Workspace::SortProjects() {
   std::vector<std::unique_ptr<Project>> sorted;
   for (size_t index : sorter.Order()) sorted.push_back(std::move(projects[index]));
   projects = std::move(sorted);
+  m_found.clear();
 }
 
 // --- Identifiers: count, then per name in byte order its length, its bytes, 16 bytes of identifier.

@@ -3,6 +3,7 @@
 
 #include <memory>
 #include <string>
+#include <string_view>
 #include <unordered_map>
 #include <vector>
 
@@ -33,6 +34,7 @@ class Workspace {
  private:
   static constexpr int kMaxLoadDepth = 1000;
   int m_loadDepth = 0;
+  mutable std::unordered_map<std::string_view, Project*> m_found;  // by name: the first of each that was looked for
 };
 
 // A project entry without the extension qrpj stands for entry/src/last.qrpj.
