@@ -5,15 +5,7 @@
 namespace qrex {
 namespace {
 
-class CachedFunctionsTest : public TranslateTest {
- protected:
-  // What comes of the body of a class.
-  std::string Body(const std::string& body, const std::string& head = "$struct S") {
-    const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
-    const size_t begin = header.find("//\n") + 3;
-    return header.substr(begin, header.find("int end;\n") - begin);
-  }
-};
+using CachedFunctionsTest = TranslateTest;
 
 TEST_F(CachedFunctionsTest, Plain) {
   EXPECT_EQ(R"~(inline vesk::int32 _calc_f() const

@@ -5,15 +5,7 @@
 namespace qrex {
 namespace {
 
-class DepFieldsTest : public TranslateTest {
- protected:
-  // What comes of the body of a class.
-  std::string Body(const std::string& body, const std::string& head = "$struct S") {
-    const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
-    const size_t begin = header.find("//\n") + 3;
-    return header.substr(begin, header.find("int end;\n") - begin);
-  }
-};
+using DepFieldsTest = TranslateTest;
 
 TEST_F(DepFieldsTest, DepWithAllSections) {
   EXPECT_EQ(R"(void a_calc(vesk::string8& a) const

@@ -239,38 +239,17 @@ template<> struct indirectly_implements_interface<K,vesk::IObject> { static cons
 template<> struct indirectly_implements_interface<K,A> { static const bool value = true; };
 )");
   const std::string tail = TranslateHeader(declarations).tail;
-  EXPECT_EQ(Section(tail, "//### $class+ K\nnamespace vesk { XTarget* app_GetXTarget(); }\n", "            1,\n"),
-            R"(    vesk::ptr<vesk::IObject> __stdcall K::sfnCreateInstance()
-    {
-        return static_cast<vesk::ptr<B> >(new K());
-    }
-    vesk::ReflectedClass const& _GetReflected(K const*)
-    {
-        static vesk::ConstStringZ K_interfaces[] =
-        {
-            "vesk::IObject",
-            "A",
-            "U",
-            "B",
-        };
-        static const vesk::ReflectedClass K_class =
-        {
-)");
+  EXPECT_EQ(Section(tail, "sfnCreateInstance()\n", "    vesk::ReflectedClass"),
+            "    {\n        return static_cast<vesk::ptr<B> >(new K());\n    }\n");
+  EXPECT_EQ(Section(WithTablesOnLines(tail), "K_interfaces[] = ", "\n"),
+            "{ \"vesk::IObject\", \"A\", \"U\", \"B\", };");
   EXPECT_EQ(Section(tail, "            K_interfaces,", "            {\n"),
             "2,2,\n            &vesk::IObject::Stubs<K>::GetTable(),\n            &K::sfnCreateInstance,\n");
-  EXPECT_EQ(Section(tail, "m_ops;\n    }\n", "    \n    // Registration"), R"(    
-    vesk::AnyInterface K::QueryInterface(const vesk::ReflectedInterface& _ri)
-    {
-        if (&_ri == &vesk::GetReflectedInterface<vesk::IObject >()) { vesk::ptr<vesk::IObject> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
-        if (&_ri == &vesk::GetReflectedInterface<A >()) { vesk::ptr<A> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
-        if (&_ri == &vesk::GetReflectedInterface<B >()) { vesk::ptr<B> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
-        return vesk::AnyInterface();
-    }
-    vesk::ReflectedClass const* K::GetReflectedClass() const
-    {
-        return &_GetReflected( (K*) 0);
-    }
-)");
+  EXPECT_EQ(tail.find("GetReflectedInterface<U >"), tail.npos);
+  for (const std::string base : {"vesk::IObject", "A", "B"}) {
+    EXPECT_EQ(Section(tail, "if (&_ri == &vesk::GetReflectedInterface<" + base + " >()) ", "\n"),
+              "{ vesk::ptr<" + base + "> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }");
+  }
   EXPECT_EQ(Section(TranslateHeader("$class P isa vesk::IPersistable { };\n").header,
                     "namespace vesk\nclass P : public ", "\n"),
             "vesk::PersistableMixin<vesk::IObjectBaseMixin<P,vesk::EmptyBase>>");

@@ -20,7 +20,7 @@ class RemoteTest : public TranslateTest {
 };
 
 TEST_F(RemoteTest, IpcIsAStubAndAScion) {
-  EXPECT_EQ(Section(TranslateHeader(Declared("ipc")).tail, "} // n\n", "\n//### $model Pos"), R"(
+  EXPECT_EQ(Section(TranslateHeader(Declared("ipc")).tail, "} // n\n", "struct ScionJFactory"), R"(
 //### Registration of stub/scion of $interface+ n::J
 namespace n
 {
@@ -122,26 +122,6 @@ struct ScionJ : vesk::Scion
         return t;
     }
 };
-struct ScionJFactory : public vesk::IScionFactory
-{
-    ScionJFactory()
-    {
-        vesk::RegisterScion(vesk::GetIpcInterfaceName<J>(),this);
-    }
-    ~ScionJFactory()
-    {
-        vesk::UnregisterScion(vesk::GetIpcInterfaceName<J>());
-    }
-    virtual vesk::Scion* CreateScion()
-    {
-        return new ScionJ;
-    }
-};
-void _Register_ScionJ()
-{
-    static ScionJFactory s;
-}
-} // n
 )");
   EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
             (std::vector<std::string>{"n::J", "n::StubJ", "n::ScionJ"}));

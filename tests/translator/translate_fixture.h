@@ -161,6 +161,11 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     Cut(generated.tail, "#include \"t.h\"\n", "");
     return generated;
   }
+  // What comes of the body of a class.
+  std::string Body(const std::string& body, const std::string& head = "$struct S") {
+    const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
+    return Section(header, "//\n", "int end;\n");
+  }
   void AssertHeader(const std::string& text, const std::string& header) {
     ASSERT_EQ(header, TranslateHeader(text).header);
   }
