@@ -171,9 +171,6 @@ TEST_F(FunctorsTest, Errors) {
   const std::string functor = "$functor void F();\n";
   AssertErrors({
       {"$functor <<\ncopy>> void F();", "(2) : error : Unrecognised qualifier << copy >> on $functor "},
-      {"$functor void;", "(1) : error : Function name expected when read ;"},
-      {"$functor void F\n;", "(2) : error : Expected ( after F when read ;"},
-      {"$functor void F(int32 a b);", "(1) : error : , or ) expected in argument list when read b"},
       {"$functor void F()\nconst;", "(2) : error : const specifier on global function prohibited"},
       {"$functor void F([int32 a]);", "(1) : error : '[' unexpected.  Polymorphic argument not allowed here"},
       {"$functor+ void F(int a);", "(1) : error : Can't accept platform dependent type: int"},

@@ -144,7 +144,6 @@ TEST_F(GlobalsTest, FunctionErrors) {
       {"$function inline void f() { }\n$function void f() { }", "(2) : error : Repeated definition of $function f"},
       {"$function void f()\nint x;", "(2) : error : Expected { after ) when read int"},
       {"\n$function void f() {\n{ }", "(2) : error : Met EOF while scanning body of function f"},
-      {"$function <<extern>> void f();", "(1) : error : Unrecognised qualifier << extern >> on $function "},
   });
 }
 

@@ -286,7 +286,6 @@ TEST_F(InterfacesTest, LadderOfDiamonds) {
 
 TEST_F(InterfacesTest, Faults) {
   AssertErrors({
-      {"$interface+ + I { };", "(1) : error : '+' modifier repeated"},
       {"$class C {\n$interface+ I { }; };", "(2) : error : '+' modifier not permitted on nested interface"},
       {"$class C {\n$interface ipc I { }; };", "(2) : error : 'ipc' modifier not permitted on nested interface"},
       {"$class C {\n$interface rmi I { }; };", "(2) : error : 'rmi' modifier not permitted on nested interface"},
