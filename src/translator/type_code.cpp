@@ -22,8 +22,13 @@ std::string_view ShortTemplate(uint8_t op) { return kTemplates[op - kOpPtr]; }
 
 // Of std::vector<std::string>: vector<std::string>.
 std::string_view LastPart(std::string_view name) {
-  const size_t colons = name.substr(0, name.find('<')).rfind("::");
-  return colons == std::string_view::npos ? name : name.substr(colons + 2);
+  int depth = 0;  // of template arguments
+  for (size_t i = name.size(); i-- > 0;) {
+    if (name[i] == '>') ++depth;
+    if (name[i] == '<') --depth;
+    if (name[i] == ':' && depth == 0) return name.substr(i + 1);
+  }
+  return name;
 }
 
 // Behind the metadata value at the head.

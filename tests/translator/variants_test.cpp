@@ -340,14 +340,16 @@ TEST_F(VariantsTest, NamesOfItemsInRecords) {
 }
 
 TEST_F(VariantsTest, Destructors) {
-  const std::string header = TranslateHeader(
-                                 "$enum E { a }; namespace n { $typedef xvector<int32> T; }\n$variant V "
-                                 "{ E; n::T t; xmap<int32,bool> m; std::map<int, std::string> s; int8; };")
-                                 .header;
+  const std::string header =
+      TranslateHeader(
+          "$enum E { a }; namespace n { $typedef xvector<int32> T; }\n$variant V "
+          "{ E; n::T t; xmap<int32,bool> m; std::map<int, std::string> s; A<b::C>::D d; int8; };")
+          .header;
   EXPECT_EQ(R"(        case 0 : as<E >().E::~E(); break;
         case 1 : as<t >().n::T::~T(); break;
         case 2 : as<m >().vesk::xmap<vesk::int32,bool >::~xmap(); break;
         case 3 : as<s >().std::map<int, std::string>::~map<int, std::string>(); break;
+        case 4 : as<d >().A<b::C>::D::~D(); break;
 )",
             Section(header, "inline V::~V()\n{\n    switch(_tag)\n    {\n", "    }\n"));
 }
