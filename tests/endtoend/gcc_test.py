@@ -1,27 +1,11 @@
 #!/usr/bin/env python3
 """Builds with the real tools of the gcc family: by the tool itself, and through the make files that it generates."""
 
-import shutil
 import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
-
-SETTINGS = """virtualTree = { "tree" }
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/include"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = { "all.qrws" }
-compiler = gcc
-systemName = "Linux"
-config = "Debug"
-platform = "x64"
-mode = build
-PATH("x64") = { "tools" "/usr/bin" "/bin" }
-INCLUDE("x64") = { "/usr/include" }
-LIB("x64") = { "/usr/lib" }
-"""
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
 
 # A program, a dynamic library that it uses, and a static library that both use.
 FILES = {
@@ -98,70 +82,57 @@ OBJECTS = "x64/**/*.o"
 LIBRARIES = "out/lib/x64/Debug/*"
 
 
-def first_example(binary):
-    need("g++")
-    example = Path(__file__).parents[2] / "examples/first"
-    with Workspace(binary, {}) as workspace:
-        shutil.copytree(example, workspace.folder, dirs_exist_ok=True)
-        workspace.run("first.qrex", "translateOnly=false", 'PATH("x64") = { "/usr/bin" "/bin" }',
-                      'INCLUDE("x64") = { "/usr/include" }', 'LIB("x64") = { "/usr/lib" }')
-        holds(workspace.shell("out/lib/x64/Debug/app"), "First: error codes\napp for x64, Debug, on Linux\n")
+@in_workspace(FILES, "g++")
+def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
+    output = workspace.run("all.qrex")
+    holds(output, "- base  [", "Linking...", "- shape  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
+    equal(sorted(workspace.times(LIBRARIES)),
+          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
+    equal(workspace.shell(PROGRAM), RESULT)
+    equal(workspace.shell(f"cd / && {workspace.path(PROGRAM)}"), RESULT)  # finds its library from anywhere
+
+    objects, targets = workspace.times(OBJECTS), workspace.times(LIBRARIES)
+    lacks(workspace.run("all.qrex"), "Linking...")
+    equal(workspace.changed(objects, OBJECTS) + workspace.changed(targets, LIBRARIES), [])
+
+    workspace.append("tree/shape/shape.h", "int More();\n")
+    workspace.run("all.qrex")
+    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
+    equal(workspace.changed(targets, LIBRARIES), ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libshape.so"])
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
-def builds_libraries_and_a_program_and_only_what_is_stale(binary):
-    need("g++")
-    with Workspace(binary, FILES) as workspace:
-        output = workspace.run("all.qrex")
-        holds(output, "- base  [", "Linking...", "- shape  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
-        equal(sorted(workspace.times(LIBRARIES)),
-              ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
-        equal(workspace.shell(PROGRAM), RESULT)
-        equal(workspace.shell(f"cd / && {workspace.path(PROGRAM)}"), RESULT)  # finds its library from anywhere
-
-        objects, targets = workspace.times(OBJECTS), workspace.times(LIBRARIES)
-        lacks(workspace.run("all.qrex"), "Linking...")
-        equal(workspace.changed(objects, OBJECTS) + workspace.changed(targets, LIBRARIES), [])
-
-        workspace.append("tree/shape/shape.h", "int More();\n")
-        workspace.run("all.qrex")
-        equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
-        equal(workspace.changed(targets, LIBRARIES), ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libshape.so"])
-        equal(workspace.shell(PROGRAM), RESULT)
+@in_workspace(FILES, "g++")
+def messages_point_at_the_source(workspace):
+    workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
+    workspace.append("tree/app/src/parts.cpp", "static int unused;\n")
+    output = workspace.run("all.qrex")
+    # Each file that imports the header reports it, at the line of the source. Compiling goes on, nothing is linked.
+    holds(output, "tree/base/numbers.h(13) ...\n", "qrexsource/x64/Debug/base/numbers.h:",
+          ": error: ‘nowhere’ was not declared in this scope\n", "- app  [",
+          "tree/app/src/parts.cpp(6) ...\n", "warning: ‘unused’ defined but not used",
+          "\nCompleted with 1 warnings, 3 errors.")
+    equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/parts.o", "x64/Debug/base/base.o",
+                                             "x64/Debug/shape/area.o"])
+    equal(workspace.times(LIBRARIES), {})
+    workspace.replace("tree/base/numbers.h", "nowhere", "0")
+    holds(workspace.run("all.qrex"), "\nCompleted....")
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
-def messages_point_at_the_source(binary):
-    need("g++")
-    with Workspace(binary, FILES) as workspace:
-        workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
-        workspace.append("tree/app/src/parts.cpp", "static int unused;\n")
-        output = workspace.run("all.qrex")
-        # Each file that imports the header reports it, at the line of the source. Compiling goes on, nothing is linked.
-        holds(output, "tree/base/numbers.h(13) ...\n", "qrexsource/x64/Debug/base/numbers.h:",
-              ": error: ‘nowhere’ was not declared in this scope\n", "- app  [",
-              "tree/app/src/parts.cpp(6) ...\n", "warning: ‘unused’ defined but not used",
-              "\nCompleted with 1 warnings, 3 errors.")
-        equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/parts.o", "x64/Debug/base/base.o",
-                                                 "x64/Debug/shape/area.o"])
-        equal(workspace.times(LIBRARIES), {})
-        workspace.replace("tree/base/numbers.h", "nowhere", "0")
-        holds(workspace.run("all.qrex"), "\nCompleted....")
-        equal(workspace.shell(PROGRAM), RESULT)
-
-
-def link_errors_are_counted_and_leave_no_target(binary):
-    need("g++")
-    with Workspace(binary, FILES) as workspace:
-        workspace.replace("tree/app/src/parts.cpp", "int Parts()", "int Other()")
-        output = workspace.run("all.qrex")
-        holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
-              "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
-              "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" \"-Wl,-rpath,",
-              "/out/lib/x64/Debug\" -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
-              "\nCompleted with 0 warnings, 1 errors.")
-        assert not workspace.path(PROGRAM).exists()
-        workspace.replace("tree/app/src/parts.cpp", "int Other()", "int Parts()")
-        workspace.run("all.qrex")
-        equal(workspace.shell(PROGRAM), RESULT)
+@in_workspace(FILES, "g++")
+def link_errors_are_counted_and_leave_no_target(workspace):
+    workspace.replace("tree/app/src/parts.cpp", "int Parts()", "int Other()")
+    output = workspace.run("all.qrex")
+    holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
+          "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
+          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" \"-Wl,-rpath,",
+          "/out/lib/x64/Debug\" -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
+          "\nCompleted with 0 warnings, 1 errors.")
+    assert not workspace.path(PROGRAM).exists()
+    workspace.replace("tree/app/src/parts.cpp", "int Other()", "int Parts()")
+    workspace.run("all.qrex")
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
 def failing_tools_are_counted_and_the_next_run_recovers(binary):
@@ -186,50 +157,46 @@ def failing_tools_are_counted_and_the_next_run_recovers(binary):
             equal(workspace.shell(PROGRAM), RESULT)
 
 
-def missing_tools_are_named_and_counted(binary):
-    need("g++")
-    with Workspace(binary, FILES) as workspace:
-        output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
-        holds(output, "ERROR: gcc-4 was not found on PATH\n", "\nCompleted with 0 warnings, 6 errors.")
-        workspace.run("all.qrex")
-        workspace.path(PROGRAM).unlink()
-        output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
-        holds(output, "ERROR: g++ was not found on PATH\n", "Return code : 127\n", "\nCompleted with 0 warnings, 1 errors.")
-        workspace.run("all.qrex")
-        equal(workspace.shell(PROGRAM), RESULT)
+@in_workspace(FILES, "g++")
+def missing_tools_are_named_and_counted(workspace):
+    output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
+    holds(output, "ERROR: gcc-4 was not found on PATH\n", "\nCompleted with 0 warnings, 6 errors.")
+    workspace.run("all.qrex")
+    workspace.path(PROGRAM).unlink()
+    output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
+    holds(output, "ERROR: g++ was not found on PATH\n", "Return code : 127\n", "\nCompleted with 0 warnings, 1 errors.")
+    workspace.run("all.qrex")
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
-def captured_output_that_cannot_be_read_is_an_error(binary):
-    need("g++")
-    with Workspace(binary, FILES) as workspace:
-        workspace.path("out1.txt").mkdir()
-        holds(workspace.run("all.qrex"), "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
-              "ERROR getting stdout\n", "x64/Debug/base/compiler.rsp: ", "\nCompleted with 0 warnings, 6 errors.")
-        workspace.path("out1.txt").rmdir()
-        workspace.run("all.qrex")
-        equal(workspace.shell(PROGRAM), RESULT)
+@in_workspace(FILES, "g++")
+def captured_output_that_cannot_be_read_is_an_error(workspace):
+    workspace.path("out1.txt").mkdir()
+    holds(workspace.run("all.qrex"), "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
+          "ERROR getting stdout\n", "x64/Debug/base/compiler.rsp: ", "\nCompleted with 0 warnings, 6 errors.")
+    workspace.path("out1.txt").rmdir()
+    workspace.run("all.qrex")
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
-def an_interrupted_tool_ends_the_run(binary):
-    need("g++")
-    with Workspace(binary, FILES) as workspace:
-        workspace.write("tools/gcc-4", "#!/bin/bash\nkill -INT $$\n")
-        output = workspace.run("all.qrex", status=1)
-        holds(output, "- base  [", "Interrupted while running gcc-4\n")
-        lacks(output, "- shape  [")
-        assert not workspace.path("out1.txt").exists() and not workspace.path("x64/Debug/base/compiler.rsp").exists()
-        translated = workspace.times("qrexsource/**/base/**/*.*")
-        workspace.path("tools/gcc-4").unlink()
-        workspace.run("all.qrex")
-        equal(workspace.shell(PROGRAM), RESULT)
-        lacks(" ".join(workspace.changed(translated, "qrexsource/**/base/*.h")), "numbers.h")
+@in_workspace(FILES, "g++")
+def an_interrupted_tool_ends_the_run(workspace):
+    workspace.write("tools/gcc-4", "#!/bin/bash\nkill -INT $$\n")
+    output = workspace.run("all.qrex", status=1)
+    holds(output, "- base  [", "Interrupted while running gcc-4\n")
+    lacks(output, "- shape  [")
+    assert not workspace.path("out1.txt").exists() and not workspace.path("x64/Debug/base/compiler.rsp").exists()
+    translated = workspace.times("qrexsource/**/base/**/*.*")
+    workspace.path("tools/gcc-4").unlink()
+    workspace.run("all.qrex")
+    equal(workspace.shell(PROGRAM), RESULT)
+    lacks(" ".join(workspace.changed(translated, "qrexsource/**/base/*.h")), "numbers.h")
 
 
-def the_other_compilers_of_the_family(binary):
-    need("g++", "clang++")
-    with Workspace(binary, FILES) as workspace:
-        workspace.run("all.qrex", "compiler=clang")
-        equal(workspace.shell(PROGRAM), RESULT)
+@in_workspace(FILES, "g++", "clang++")
+def the_other_compilers_of_the_family(workspace):
+    workspace.run("all.qrex", "compiler=clang")
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
 # --- Make files. `ar` does not take the switches of the generated rules; a relocatable link serves.
@@ -237,44 +204,41 @@ def the_other_compilers_of_the_family(binary):
 MAKE = "make -f make_all_x64_Debug AR='g++ -r'"
 
 
-def make_builds_the_same_targets(binary):
-    need("g++", "make")
-    with Workspace(binary, FILES) as workspace:
-        workspace.run("all.qrex", "mode=gen")
-        assert b"\r\n" in workspace.path("make_app_x64_Debug").read_bytes()
-        workspace.shell("make AR='g++ -r'")
-        equal(workspace.shell(PROGRAM), RESULT)
-        equal(sorted(workspace.times(LIBRARIES)),
-              ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
+@in_workspace(FILES, "g++", "make")
+def make_builds_the_same_targets(workspace):
+    workspace.run("all.qrex", "mode=gen")
+    assert b"\r\n" in workspace.path("make_app_x64_Debug").read_bytes()
+    workspace.shell("make AR='g++ -r'")
+    equal(workspace.shell(PROGRAM), RESULT)
+    equal(sorted(workspace.times(LIBRARIES)),
+          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
 
-        objects = workspace.times(OBJECTS)
-        workspace.shell(MAKE)
-        equal(workspace.changed(objects, OBJECTS), [])
-        workspace.append("tree/shape/shape.h", "int More();\n")
-        workspace.shell(MAKE)
-        equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
+    objects = workspace.times(OBJECTS)
+    workspace.shell(MAKE)
+    equal(workspace.changed(objects, OBJECTS), [])
+    workspace.append("tree/shape/shape.h", "int More();\n")
+    workspace.shell(MAKE)
+    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
 
-        workspace.shell("make dclean")
-        equal((workspace.times(OBJECTS), workspace.times("x64/**/*.d"), workspace.times(LIBRARIES)), ({}, {}, {}))
-        equal(workspace.times("qrexsource/**/*.cpp"), {})
-        workspace.shell(f"{MAKE} -j4")
-        equal(workspace.shell(PROGRAM), RESULT)
+    workspace.shell("make dclean")
+    equal((workspace.times(OBJECTS), workspace.times("x64/**/*.d"), workspace.times(LIBRARIES)), ({}, {}, {}))
+    equal(workspace.times("qrexsource/**/*.cpp"), {})
+    workspace.shell(f"{MAKE} -j4")
+    equal(workspace.shell(PROGRAM), RESULT)
 
 
-def make_takes_a_compiler_launcher(binary):
-    need("g++", "make", "ccache")
-    with Workspace(binary, FILES) as workspace:
-        workspace.run("all.qrex", "mode=gen")
-        cache = str(workspace.path("cache"))
-        workspace.shell(f"{MAKE} CXX='ccache g++'", CCACHE_DIR=cache)
-        equal(workspace.shell(PROGRAM), RESULT)
-        workspace.shell("make dclean", CCACHE_DIR=cache)
-        workspace.shell(f"{MAKE} CXX='ccache g++'", CCACHE_DIR=cache)
-        holds(workspace.shell("ccache --print-stats", CCACHE_DIR=cache), "direct_cache_hit\t5\n")
+@in_workspace(FILES, "g++", "make", "ccache")
+def make_takes_a_compiler_launcher(workspace):
+    workspace.run("all.qrex", "mode=gen")
+    cache = str(workspace.path("cache"))
+    workspace.shell(f"{MAKE} CXX='ccache g++'", CCACHE_DIR=cache)
+    equal(workspace.shell(PROGRAM), RESULT)
+    workspace.shell("make dclean", CCACHE_DIR=cache)
+    workspace.shell(f"{MAKE} CXX='ccache g++'", CCACHE_DIR=cache)
+    holds(workspace.shell("ccache --print-stats", CCACHE_DIR=cache), "direct_cache_hit\t5\n")
 
 
 run_tests([
-    first_example,
     builds_libraries_and_a_program_and_only_what_is_stale,
     messages_point_at_the_source,
     link_errors_are_counted_and_leave_no_target,

@@ -7,26 +7,17 @@ import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Workspace, equal, holds, lacks, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, lacks, run_tests  # noqa: E402
 
 DATA = Path(__file__).parents[1] / "generators/workspace"
-SETTINGS = """virtualTree = {{ "tree" "{family}" }}
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/translated"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = {{ "all.qrws" }}
-compiler = {compiler}
-defaultToDll = false
-mode = gen
-"""
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 NAMESPACE = "{http://schemas.microsoft.com/developer/msbuild/2003}"
 
 
 def generate(binary, compiler):
     family = "vc" if compiler.startswith("vc") else "gcc"
-    workspace = Workspace(binary, {"main.qrex": SETTINGS.format(family=family, compiler=compiler),
-                                   "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n'})
+    workspace = Workspace(binary, {"main.qrex": SETTINGS + f'virtualTree += {{ "{family}" }} compiler = {compiler} '
+                                   "defaultToDll = false mode = gen", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n'})
     shutil.copytree(DATA, workspace.folder, dirs_exist_ok=True)
     workspace.run("main.qrex")
     return workspace

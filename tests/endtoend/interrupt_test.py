@@ -13,22 +13,10 @@ import time
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Workspace, need, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, need, run_tests  # noqa: E402
 
 ROUNDS = int(sys.argv[2]) if len(sys.argv) > 2 else 15
 PROJECTS = 8
-SETTINGS = """virtualTree = { "tree" }
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/include"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = { "all.qrws" }
-config = "Debug"
-platform = "x64"
-systemName = "Linux"
-PATH("x64") = { "/usr/bin" "/bin" }
-INCLUDE("x64") = { "/usr/include" }
-LIB("x64") = { "/usr/lib" }
-"""
 
 
 def files():

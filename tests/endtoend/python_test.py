@@ -1,96 +1,81 @@
+#!/usr/bin/env python3
 """Runs of the tool that use Python, and runs that must not need it."""
-import os
+
 import re
-import subprocess
 import sys
-import tempfile
+from pathlib import Path
 
-BINARY = os.path.abspath(sys.argv[1])
-DOCS = os.path.join(os.path.dirname(__file__), "..", "..", "docs", "python.md")
-passed = failed = skipped = 0
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, run_tests  # noqa: E402
 
-CONFIG = """virtualTree = { "." }
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/include"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = { "app" }
-config = "Debug"
-platform = "x64"
-compiler = gcc
-translateOnly = true
-"""
+DOCS = Path(__file__).parents[2] / "docs/python.md"
 PROJECT = """$TARGET_TYPE = "Application"
 $ROOT_TO_PROJDIR = "app"
 qrex
 config { "Debug|x64" }
 { "src" { %s } }
 """
+MISSING = "/nonexistent/libpython.so"
 
 
-def translate(files, python=None):
-    """The run's status, its output, and the generated text of each file."""
-    with tempfile.TemporaryDirectory() as root:
-        os.makedirs(root + "/app/src")
-        listed = " ".join('"%s"' % name for name in files if not name.endswith(".csv"))
-        sources = dict(files, **{"app.qrpj": PROJECT % listed})
-        for name, text in sources.items():
-            with open(root + "/app/src/" + name, "w") as file:
-                file.write(text)
-        for name, text in (("main.qrex", CONFIG), (".qrwsroot", "")):
-            with open(root + "/" + name, "w") as file:
-                file.write(text)
-        environment = {key: value for key, value in os.environ.items() if key != "QREX_PYTHON"}
-        if python:
-            environment["QREX_PYTHON"] = python
-        run = subprocess.run([BINARY, "main.qrex"], cwd=root, env=environment, capture_output=True, text=True, timeout=60)
-        generated = {}
-        for name in files:
-            path = root + "/qrexsource/x64/Debug/app/src/" + name
-            if os.path.exists(path):
-                generated[name] = open(path).read()
-        return run.returncode, run.stdout, generated
+def translate(binary, files, status=0, **environment):
+    """The run's output, and the generated text of each file."""
+    listed = " ".join(f'"{name}"' for name in files if not name.endswith(".csv"))
+    with Workspace(binary, {"all.qrex": SETTINGS + "translateOnly = true", "tree/.qrwsroot": "",
+                            "tree/all.qrws": '"all" { "app" }', "tree/app/src/app.qrpj": PROJECT % listed}) as workspace:
+        for name, text in files.items():
+            workspace.write("tree/app/src/" + name, text)
+        output = workspace.run("all.qrex", status=status, **environment)
+        generated = {path.name: path.read_text() for path in workspace.folder.glob("qrexsource/x64/Debug/app/src/*")}
+        return output, generated
 
 
-def check(name, holds, seen):
-    global passed, failed
-    if holds:
-        passed += 1
-    else:
-        failed += 1
-        print("FAILED", name, "\n", seen)
+def need_python(binary):
+    with_python = "@runpython { x = 1 }\n"
+    try:
+        translate(binary, {"t.py": with_python})
+    except AssertionError as failure:
+        if "can't be loaded" in str(failure):
+            raise Skipped("Python 2.7")
+        raise
 
 
-def blocks_of_docs():
-    text = open(DOCS).read()
-    return [re.sub(r"(?m)^    ", "", block) for block in re.findall(r"(?m)(?:^    .*\n)+", text)]
+def a_missing_library_is_named(binary):
+    python = {"status": 1, "QREX_PYTHON": MISSING}
+    output, _ = translate(binary, {"t.py": "@runpython { x = 1 }\n"}, **python)
+    assert re.search(r"app/src/t\.py\(1\) : error : Python initialisation error: Python 2\.7 can't be loaded; tried\n +"
+                     + MISSING, output), output
+    # A second attempt fails as the first.
+    output, _ = translate(binary, {"t.py": "@assertfails(@runpython { x = 1 })\n@runpython { x = 2 }\n"}, **python)
+    holds(output, "app/src/t.py(2)")
 
 
-missing = "/nonexistent/libpython.so"
-status, output, _ = translate({"t.py": "@runpython { x = 1 }\n"}, missing)
-check("a missing library is named", status == 1 and re.search(
-    r"app/src/t\.py\(1\) : error : Python initialisation error: Python 2\.7 can't be loaded; tried\n +" + missing, output),
-    output)
-status, output, _ = translate({"t.py": "@assertfails(@runpython { x = 1 })\n@runpython { x = 2 }\n"}, missing)
-check("a second attempt fails as the first", status == 1 and "app/src/t.py(2)" in output, output)
-status, output, generated = translate({"t.py": "@runpython { }\ntext\n"}, missing)
-check("an empty block needs no Python", status == 0 and generated.get("t.py") == "text\n", output)
+def an_empty_block_needs_no_python(binary):
+    _, generated = translate(binary, {"t.py": "@runpython { }\ntext\n"}, QREX_PYTHON=MISSING)
+    equal(generated, {"t.py": "text\n"})
 
-status, output, _ = translate({"t.py": "@runpython { x = 1 }\n"})
-if "can't be loaded" in output:
-    skipped += 1
-    print("skipped: no Python 2.7 library was found")
-else:
-    table, header, expected = blocks_of_docs()
-    status, output, generated = translate({"commands.csv": table, "commands.h": header})
-    squeezed = re.sub(r"(?m)^ +\n", "", generated.get("commands.h", ""))  # a line that @for leaves blank
-    check("the documented example", expected in squeezed, output + str(generated))
 
-    status, output, _ = translate({"t.py": '@print("a")\n@runpython\n{\n    print "b",\n    import sys\n'
+def the_documented_example(binary):
+    need_python(binary)
+    blocks = re.findall(r"(?m)(?:^    .*\n)+", DOCS.read_text())
+    table, header, expected = (re.sub(r"(?m)^    ", "", block) for block in blocks)
+    _, generated = translate(binary, {"commands.csv": table, "commands.h": header})
+    holds(re.sub(r"(?m)^ +\n", "", generated["commands.h"]), expected)  # without the lines that @for leaves blank
+
+
+def prints_keep_their_order(binary):
+    need_python(binary)
+    output, _ = translate(binary, {"t.py": '@print("a")\n@runpython\n{\n    print "b",\n    import sys\n'
                                            '    sys.__stdout__.write("c")\n}\n@print("d")\n'})
-    check("prints keep their order", '"a"bc"d"' in output, output)
+    holds(output, '"a"bc"d"')
 
-    status, output, generated = translate({"t.py": "@runpython\n{\n    import sys\n    sys.exit(0)\n}\n"})
-    check("exit is an error", status == 1 and "RunPython error: SystemExit: 0\n" in output and not generated, output)
 
-print("%d passed, %d failed, %d skipped" % (passed, failed, skipped))
-sys.exit(failed > 0)
+def exit_is_an_error(binary):
+    need_python(binary)
+    output, generated = translate(binary, {"t.py": "@runpython\n{\n    import sys\n    sys.exit(0)\n}\n"}, status=1)
+    holds(output, "RunPython error: SystemExit: 0\n")
+    equal(generated, {})
+
+
+run_tests([a_missing_library_is_named, an_empty_block_needs_no_python, the_documented_example, prints_keep_their_order,
+           exit_is_an_error])

@@ -7,32 +7,18 @@ import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
 
 HERE = Path(__file__).resolve().parent
 ROOT = HERE.parent.parent
 TOUR = ROOT / "examples" / "tour"
 
-SETTINGS = """virtualTree = { "tree" "%s" }
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/include"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = { "%s" }
-compiler = gcc
-systemName = "Linux"
-config = "Debug"
-platform = "x64"
-mode = build
-PATH("x64") = { "/usr/local/bin" "/usr/bin" "/bin" }
-INCLUDE("x64") = { "/usr/include" }
-LIB("x64") = { "/usr/lib" }
-"""
-
 
 def build(binary, tree, workspace_file):
     """A workspace with a copy of the tree, built without a warning."""
     need("g++")
-    workspace = Workspace(binary, {"all.qrex": SETTINGS % (ROOT / "runtime", workspace_file)})
+    workspace = Workspace(binary, {"all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} '
+                                              f'workspaces = {{ "{workspace_file}" }}'})
     shutil.copytree(tree, workspace.path("tree"))
     holds(workspace.run("all.qrex"), "\nCompleted..")
     for word in (" : warning ", " warning: ", " error: ", " : error "):

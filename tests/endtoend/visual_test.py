@@ -10,7 +10,7 @@ import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Skipped, Workspace, equal, holds, lacks, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Skipped, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
 
 
 def tool(name):
@@ -43,23 +43,10 @@ manifest=${{text##* \\"}}; manifest=${{manifest%%\\"*}}
     return {f"tools/{name}": f"#!/bin/bash\n{script}\n" for name, script in scripts.items()}
 
 
-SETTINGS = """virtualTree = { "tree" }
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/include"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = { "all.qrws" }
-compiler = vc14
-systemName = "Windows"
-config = "Debug"
-platform = "Win64"
-mode = build
-PATH("Win64") = { "tools" "/usr/bin" "/bin" }
-INCLUDE("Win64") = { "inc" }
-LIB("Win64") = { "lib" }
-"""
-
 FILES = {
-    "all.qrex": SETTINGS,
+    "all.qrex": SETTINGS + """compiler = vc14 systemName = "Windows" platform = "Win64"
+PATH("Win64") = { "tools" "/usr/bin" "/bin" } INCLUDE("Win64") = { "inc" } LIB("Win64") = { "lib" }
+""",
     "tree/.qrwsroot": "",
     "tree/all.qrws": '"all" { "app" }\n',
     "tree/common.inc": """config { "Debug|Win64" }
@@ -121,8 +108,8 @@ TARGETS = "out/lib/Win64/Debug/*"
 MACHINE_X64, IS_DLL, CONSOLE = 0x8664, 0x2000, 3
 
 
-def new_workspace(binary):
-    return Workspace(binary, {**tools(), **FILES})
+def all_files():
+    return {**tools(), **FILES}
 
 
 def image(path):
@@ -139,84 +126,85 @@ def image(path):
     return machine, characteristics & IS_DLL, subsystem, names
 
 
-def libraries_and_a_program(binary):
-    with new_workspace(binary) as workspace:
-        output = workspace.run("all.qrex")
-        holds(output, "- base  [Debug|Win64]", "Linking...\n", "- shape  [", "Compiling resource file shape/src/shape.rc\n",
-              "Linking...\n", "- app  [", "Linking...\n", "\nCompleted....")
-        equal(workspace.path("out/lib/Win64/Debug/base.lib").read_bytes()[:8], b"!<arch>\n")
-        machine, is_dll, _, sections = image(workspace.path("out/lib/Win64/Debug/shape.dll"))
-        equal((machine, is_dll, ".rsrc" in sections), (MACHINE_X64, IS_DLL, True))
-        equal(image(workspace.path("out/lib/Win64/Debug/app.exe"))[:3], (MACHINE_X64, 0, CONSOLE))
-        for project in ("app", "shape"):
-            holds(workspace.path(f"Win64/Debug/{project}/mt.dep").read_text(), "Manifest resource last updated at ")
-        equal([str(path) for path in workspace.folder.glob("**/*.rsp")], [])
+@in_workspace(all_files)
+def libraries_and_a_program(workspace):
+    output = workspace.run("all.qrex")
+    holds(output, "- base  [Debug|Win64]", "Linking...\n", "- shape  [", "Compiling resource file shape/src/shape.rc\n",
+          "Linking...\n", "- app  [", "Linking...\n", "\nCompleted....")
+    equal(workspace.path("out/lib/Win64/Debug/base.lib").read_bytes()[:8], b"!<arch>\n")
+    machine, is_dll, _, sections = image(workspace.path("out/lib/Win64/Debug/shape.dll"))
+    equal((machine, is_dll, ".rsrc" in sections), (MACHINE_X64, IS_DLL, True))
+    equal(image(workspace.path("out/lib/Win64/Debug/app.exe"))[:3], (MACHINE_X64, 0, CONSOLE))
+    for project in ("app", "shape"):
+        holds(workspace.path(f"Win64/Debug/{project}/mt.dep").read_text(), "Manifest resource last updated at ")
+    equal([str(path) for path in workspace.folder.glob("**/*.rsp")], [])
 
-        before = workspace.times("Win64/**/*"), workspace.times(TARGETS)
-        lacks(workspace.run("all.qrex"), "Linking...")
-        equal((workspace.times("Win64/**/*"), workspace.times(TARGETS)), before)
+    before = workspace.times("Win64/**/*"), workspace.times(TARGETS)
+    lacks(workspace.run("all.qrex"), "Linking...")
+    equal((workspace.times("Win64/**/*"), workspace.times(TARGETS)), before)
 
-        workspace.append("tree/shape/shape.h", "int More();\n")
-        workspace.run("all.qrex")
-        equal(workspace.changed(before[0], OBJECTS), ["Win64/Debug/app/StdAfx.obj", "Win64/Debug/app/app.obj",
-                                                      "Win64/Debug/shape/StdAfx.obj", "Win64/Debug/shape/shape.obj"])
-
-
-def command_lines(binary):
-    with new_workspace(binary) as workspace:
-        output = workspace.run("all.qrex", "diagnostics=true")
-        includes = lambda project: "".join(f' /I "{path}"' for path in (  # noqa: E731
-            f"qrexsource/Win64/Debug/{project}", f"qrexsource/Win64/Debug/{project}/src", "qrexsource/Win64/Debug", "tree"))
-        switches = '/GS- /Zl /D "LEVEL=7" /D "base_STATIC_LIBRARY" /nologo /W3 '
-        holds(output,
-              "Compiling base/src/StdAfx.cpp\n",
-              f'Win64/Debug/base/compiler.rsp = {switches}/Yc"StdAfx.h" {includes("base")} /Fp"Win64/Debug/base/base.pch" '
-              '/Fo"Win64/Debug/base/" /Fd"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/StdAfx.cpp"\n',
-              'cmd /c cl /c @"Win64/Debug/base/compiler.rsp" 1>out1.txt\n',
-              "Compiling base/src/level.cpp\n", f'= {switches}/Yu"StdAfx.h" {includes("base")} ',
-              "Assembling base/src/twice.asm\n",
-              'Win64/Debug/base/masm.rsp =  /Fo"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/twice.asm"\n'
-              'cmd /c ml64 /c /Cx /nologo @"Win64/Debug/base/masm.rsp" 1>out1.txt\n',
-              "Linking...\n",
-              'Win64/Debug/base/linker.rsp =  /OUT:"out/lib/Win64/Debug/base.lib" "Win64/Debug/base/StdAfx.obj" '
-              '"Win64/Debug/base/level.obj" "Win64/Debug/base/base.obj" "Win64/Debug/base/twice.obj"\n'
-              'lib.exe @"Win64/Debug/base/linker.rsp"\n',
-              "Compiling resource file shape/src/shape.rc\n",
-              'rc.exe  /fo"Win64/Debug/shape/shape.res" "tree/shape/src/shape.rc"\n',
-              "Win64/Debug/shape/linker.rsp =  /DLL /NOENTRY /NODEFAULTLIB", ' "Win64/Debug/shape/shape.res"',
-              "Embedding manifest...\n"
-              '/outputresource:"out/lib/Win64/Debug/shape.dll";#2 /manifest '
-              '"./Win64/Debug/shape/shape.dll.intermediate.manifest"\n'
-              'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\n',
-              '"Win64\\Debug\\shape\\mtdep.bat"\n',
-              ' "Win64/Debug/app/app.obj" "out/lib/Win64/Debug/base.lib" "out/lib/Win64/Debug/shape.lib"\n'
-              'link.exe @"Win64/Debug/app/linker.rsp"\n',
-              '/outputresource:"out/lib/Win64/Debug/app.exe";#1 /manifest ')
+    workspace.append("tree/shape/shape.h", "int More();\n")
+    workspace.run("all.qrex")
+    equal(workspace.changed(before[0], OBJECTS), ["Win64/Debug/app/StdAfx.obj", "Win64/Debug/app/app.obj",
+                                                  "Win64/Debug/shape/StdAfx.obj", "Win64/Debug/shape/shape.obj"])
 
 
-def messages_are_counted_and_point_at_the_source(binary):
-    with new_workspace(binary) as workspace:
-        workspace.append("tree/base/src/base.cpp", "\nint Narrow()\n{\n    int unset;\n    return unset;\n}\n")
-        workspace.append("tree/base/src/level.cpp", "int Broken()\n{\n    return nowhere;\n}\n")
-        workspace.append("tree/app/src/app.cpp", "int wrong = nowhere;\n")
-        workspace.replace("tree/common.inc", "/W3", "/W4")
-        output = workspace.run("all.qrex")
-        holds(output, "- base  [",
-              "tree/base/src/level.cpp(8) ...\nqrexsource/Win64/Debug/base/src/level.cpp(",
-              "): error: use of undeclared identifier 'nowhere'\n",
-              "tree/base/src/base.cpp(6) ...\nqrexsource/Win64/Debug/base/src/base.cpp(", "): warning: ",
-              "- app  [", "tree/app/src/app.cpp(7) ...\n", "): error: ", "\nCompleted with 1 warnings, 2 errors.")
-        equal(sorted(name for name in workspace.times(TARGETS) if not name.endswith(".manifest")),
-              ["out/lib/Win64/Debug/shape.dll", "out/lib/Win64/Debug/shape.lib"])
-        workspace.replace("tree/base/src/level.cpp", "nowhere", "0")
-        workspace.replace("tree/app/src/app.cpp", "nowhere", "0")
-        output = workspace.run("all.qrex")
-        holds(output, "- base  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
-        image(workspace.path("out/lib/Win64/Debug/app.exe"))
+@in_workspace(all_files)
+def command_lines(workspace):
+    output = workspace.run("all.qrex", "diagnostics=true")
+    includes = lambda project: "".join(f' /I "{path}"' for path in (  # noqa: E731
+        f"qrexsource/Win64/Debug/{project}", f"qrexsource/Win64/Debug/{project}/src", "qrexsource/Win64/Debug", "tree"))
+    switches = '/GS- /Zl /D "LEVEL=7" /D "base_STATIC_LIBRARY" /nologo /W3 '
+    holds(output,
+          "Compiling base/src/StdAfx.cpp\n",
+          f'Win64/Debug/base/compiler.rsp = {switches}/Yc"StdAfx.h" {includes("base")} /Fp"Win64/Debug/base/base.pch" '
+          '/Fo"Win64/Debug/base/" /Fd"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/StdAfx.cpp"\n',
+          'cmd /c cl /c @"Win64/Debug/base/compiler.rsp" 1>out1.txt\n',
+          "Compiling base/src/level.cpp\n", f'= {switches}/Yu"StdAfx.h" {includes("base")} ',
+          "Assembling base/src/twice.asm\n",
+          'Win64/Debug/base/masm.rsp =  /Fo"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/twice.asm"\n'
+          'cmd /c ml64 /c /Cx /nologo @"Win64/Debug/base/masm.rsp" 1>out1.txt\n',
+          "Linking...\n",
+          'Win64/Debug/base/linker.rsp =  /OUT:"out/lib/Win64/Debug/base.lib" "Win64/Debug/base/StdAfx.obj" '
+          '"Win64/Debug/base/level.obj" "Win64/Debug/base/base.obj" "Win64/Debug/base/twice.obj"\n'
+          'lib.exe @"Win64/Debug/base/linker.rsp"\n',
+          "Compiling resource file shape/src/shape.rc\n",
+          'rc.exe  /fo"Win64/Debug/shape/shape.res" "tree/shape/src/shape.rc"\n',
+          "Win64/Debug/shape/linker.rsp =  /DLL /NOENTRY /NODEFAULTLIB", ' "Win64/Debug/shape/shape.res"',
+          "Embedding manifest...\n"
+          '/outputresource:"out/lib/Win64/Debug/shape.dll";#2 /manifest '
+          '"./Win64/Debug/shape/shape.dll.intermediate.manifest"\n'
+          'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\n',
+          '"Win64\\Debug\\shape\\mtdep.bat"\n',
+          ' "Win64/Debug/app/app.obj" "out/lib/Win64/Debug/base.lib" "out/lib/Win64/Debug/shape.lib"\n'
+          'link.exe @"Win64/Debug/app/linker.rsp"\n',
+          '/outputresource:"out/lib/Win64/Debug/app.exe";#1 /manifest ')
 
 
-def failing_steps_are_counted_and_the_next_run_recovers(binary):
-    def fails(workspace, name, script, *messages):
+@in_workspace(all_files)
+def messages_are_counted_and_point_at_the_source(workspace):
+    workspace.append("tree/base/src/base.cpp", "\nint Narrow()\n{\n    int unset;\n    return unset;\n}\n")
+    workspace.append("tree/base/src/level.cpp", "int Broken()\n{\n    return nowhere;\n}\n")
+    workspace.append("tree/app/src/app.cpp", "int wrong = nowhere;\n")
+    workspace.replace("tree/common.inc", "/W3", "/W4")
+    output = workspace.run("all.qrex")
+    holds(output, "- base  [",
+          "tree/base/src/level.cpp(8) ...\nqrexsource/Win64/Debug/base/src/level.cpp(",
+          "): error: use of undeclared identifier 'nowhere'\n",
+          "tree/base/src/base.cpp(6) ...\nqrexsource/Win64/Debug/base/src/base.cpp(", "): warning: ",
+          "- app  [", "tree/app/src/app.cpp(7) ...\n", "): error: ", "\nCompleted with 1 warnings, 2 errors.")
+    equal(sorted(name for name in workspace.times(TARGETS) if not name.endswith(".manifest")),
+          ["out/lib/Win64/Debug/shape.dll", "out/lib/Win64/Debug/shape.lib"])
+    workspace.replace("tree/base/src/level.cpp", "nowhere", "0")
+    workspace.replace("tree/app/src/app.cpp", "nowhere", "0")
+    output = workspace.run("all.qrex")
+    holds(output, "- base  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
+    image(workspace.path("out/lib/Win64/Debug/app.exe"))
+
+
+@in_workspace(all_files)
+def failing_steps_are_counted_and_the_next_run_recovers(workspace):
+    def fails(name, script, *messages):
         original = workspace.path(f"tools/{name}").read_text()
         workspace.write(f"tools/{name}", f"#!/bin/bash\n{script}\n")
         output = workspace.run("all.qrex")
@@ -226,19 +214,18 @@ def failing_steps_are_counted_and_the_next_run_recovers(binary):
         lacks(workspace.output, "errors")
         image(workspace.path("out/lib/Win64/Debug/app.exe"))
 
-    with new_workspace(binary) as workspace:
-        fails(workspace, "mt.exe", "exit 31", 'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\nReturn code : 31\n',
-              "\nCompleted with 0 warnings, 2 errors.")
-        workspace.append("tree/shape/src/shape.rc", "2 VERSIONINFO\nBEGIN\nEND\n")
-        fails(workspace, "rc.exe", "exit 1", "Compiling resource file shape/src/shape.rc\n", "Return code : 1\n",
-              "\nCompleted with 0 warnings, 1 errors.")
-        workspace.append("tree/app/src/app.cpp", "int more;\n")
-        fails(workspace, "cl", 'echo x > Win64/Debug/app/app.obj; kill -KILL $$', "ERROR: cl was ended by signal 9\n",
-              "\nCompleted with 0 warnings, 1 errors.")
-        workspace.append("tree/app/src/app.cpp", "int other;\n")
-        fails(workspace, "link.exe", 'echo x > out/lib/Win64/Debug/app.exe; kill -KILL $$',
-              "ERROR: link.exe was ended by signal 9\n", "Return code : 137\n", "Win64/Debug/app/linker.rsp:  /ENTRY:",
-              "\nCompleted with 0 warnings, 1 errors.")
+    fails("mt.exe", "exit 31", 'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\nReturn code : 31\n',
+          "\nCompleted with 0 warnings, 2 errors.")
+    workspace.append("tree/shape/src/shape.rc", "2 VERSIONINFO\nBEGIN\nEND\n")
+    fails("rc.exe", "exit 1", "Compiling resource file shape/src/shape.rc\n", "Return code : 1\n",
+          "\nCompleted with 0 warnings, 1 errors.")
+    workspace.append("tree/app/src/app.cpp", "int more;\n")
+    fails("cl", 'echo x > Win64/Debug/app/app.obj; kill -KILL $$', "ERROR: cl was ended by signal 9\n",
+          "\nCompleted with 0 warnings, 1 errors.")
+    workspace.append("tree/app/src/app.cpp", "int other;\n")
+    fails("link.exe", 'echo x > out/lib/Win64/Debug/app.exe; kill -KILL $$',
+          "ERROR: link.exe was ended by signal 9\n", "Return code : 137\n", "Win64/Debug/app/linker.rsp:  /ENTRY:",
+          "\nCompleted with 0 warnings, 1 errors.")
 
 
 run_tests([

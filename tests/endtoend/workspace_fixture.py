@@ -1,5 +1,6 @@
 """A workspace in a temporary folder, runs of the tool in it, and the closing line of an end-to-end test."""
 
+import functools
 import os
 import shutil
 import stat
@@ -8,6 +9,21 @@ import sys
 import tempfile
 import traceback
 from pathlib import Path
+
+# A configuration for the tools of the gcc family; what is added behind it overrides.
+SETTINGS = """virtualTree = { "tree" }
+$EXPORT_LIB = "out/lib"
+$EXPORT_TRANSLATED_INCLUDE = "out/include"
+$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
+workspaces = { "all.qrws" }
+compiler = gcc
+systemName = "Linux"
+config = "Debug"
+platform = "x64"
+PATH("x64") = { "tools" "/usr/local/bin" "/usr/bin" "/bin" }
+INCLUDE("x64") = { "/usr/include" }
+LIB("x64") = { "/usr/lib" }
+"""
 
 
 class Skipped(Exception):
@@ -46,9 +62,10 @@ class Workspace:
         assert old in text, f"{old!r} does not stand in {name}"
         self.path(name).write_text(text.replace(old, new))
 
-    def run(self, *arguments, status=0):
+    def run(self, *arguments, status=0, **environment):
         """Runs the tool; its standard output. Fails on another exit status."""
-        done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900)
+        done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900,
+                              env={**os.environ, **environment})
         self.output = done.stdout
         assert done.returncode == status, f"status {done.returncode}, not {status}:\n{done.stdout}{done.stderr}"
         return done.stdout
@@ -91,6 +108,18 @@ def need(*tools):
     for tool in tools:
         if not shutil.which(tool):
             raise Skipped(tool)
+
+
+def in_workspace(files, *tools):
+    """Makes a test of a function of a workspace with these files (or what a call gives), and with the tools at hand."""
+    def decorate(test):
+        @functools.wraps(test)
+        def run(binary):
+            need(*tools)
+            with Workspace(binary, files() if callable(files) else files) as workspace:
+                test(workspace)
+        return run
+    return decorate
 
 
 def run_tests(tests):
