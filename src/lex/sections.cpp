@@ -113,37 +113,8 @@ TextRange ReadParenBlock(LexScanner& scanner, int& indent) {
   return ReadBlock(scanner, kOpenParen, kCloseParen, "(", ")", true, indent);
 }
 
-LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close) {
-  SkipWhiteSpace(scanner);
-  const char* const begin = scanner.begin;
-  auto failAtEnd = [&] {
-    throw LexScannerException("Met EOS while reading argument " + std::string(begin, scanner.end), scanner.end);
-  };
-  if (!scanner.AtEnd() && *scanner.begin == '`') {
-    const size_t length = std::string_view(begin + 1, static_cast<size_t>(scanner.end - begin) - 1).find('`');
-    if (length == std::string_view::npos) failAtEnd();
-    argument = TextRange(begin + 1, begin + 1 + length);
-    scanner.begin = argument.end + 1;
-    return NextToken(scanner);
-  }
-  argument = TextRange(begin, begin);
-  int32_t nest = kNoToken;  // the opening bracket of the nest at hand
-  for (int64_t depth = 0;;) {
-    argument.end = scanner.begin;
-    const LexToken token = NextToken(scanner);
-    if (token.kind == kEndOfText) failAtEnd();
-    if (depth == 0) {
-      if (token.kind == kComma || token.kind == close) return token;
-      if (token.kind == kOpenParen || token.kind == kOpenBrace || token.kind == kOpenBracket) {
-        nest = token.kind;
-        depth = 1;
-      }
-    } else if (token.kind == nest) {
-      ++depth;
-    } else if (token.kind == nest + 1) {
-      --depth;
-    }
-  }
+void FailAtEndOfArgument(const LexScanner& scanner, const char* begin) {
+  throw LexScannerException("Met EOS while reading argument " + std::string(begin, scanner.end), scanner.end);
 }
 
 }  // namespace qrex

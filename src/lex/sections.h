@@ -17,7 +17,49 @@ TextRange ReadBlock(LexScanner& scanner, int32_t open, int32_t close, const char
 TextRange ReadBraceBlock(LexScanner& scanner, int& indent);  // optional braces: else the rest of the line
 TextRange ReadParenBlock(LexScanner& scanner, int& indent);  // required parentheses
 
-// One comma-separated argument; returns the token that ended it, `,` or `close`.
-LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close);
+// One comma-separated argument; returns the token that ended it, `,` or `close`. `visit` gets each token of it; of one
+// in back quotes, which is not read as tokens, just the first quote.
+template <typename Visit>
+LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close, Visit visit);
+inline LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close) {
+  return ReadArgument(scanner, argument, close, [](const LexToken&) {});
+}
+
+// --- Implementation
+
+[[noreturn]] void FailAtEndOfArgument(const LexScanner& scanner, const char* begin);
+
+template <typename Visit>
+LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close, Visit visit) {
+  SkipWhiteSpace(scanner);
+  const char* const begin = scanner.begin;
+  if (!scanner.AtEnd() && *begin == '`') {
+    const size_t length = std::string_view(begin + 1, static_cast<size_t>(scanner.end - begin) - 1).find('`');
+    if (length == std::string_view::npos) FailAtEndOfArgument(scanner, begin);
+    argument = TextRange(begin + 1, begin + 1 + length);
+    visit(LexToken{kBackquote, {begin, begin + 1}});
+    scanner.begin = argument.end + 1;
+    return NextToken(scanner);
+  }
+  argument = TextRange(begin, begin);
+  int32_t nest = kNoToken;  // the opening bracket of the nest at hand
+  for (int64_t depth = 0;;) {
+    argument.end = scanner.begin;
+    const LexToken token = NextToken(scanner);
+    if (token.kind == kEndOfText) FailAtEndOfArgument(scanner, begin);
+    if (depth == 0) {
+      if (token.kind == kComma || token.kind == close) return token;
+      if (token.kind == kOpenParen || token.kind == kOpenBrace || token.kind == kOpenBracket) {
+        nest = token.kind;
+        depth = 1;
+      }
+    } else if (token.kind == nest) {
+      ++depth;
+    } else if (token.kind == nest + 1) {
+      --depth;
+    }
+    visit(token);
+  }
+}
 
 }  // namespace qrex

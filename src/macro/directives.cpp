@@ -145,7 +145,7 @@ void ExpansionContext::Quote() {
   while (!m_scanner.AtEnd()) {
     const size_t lineFeed = m_scanner.View().find('\n');
     const char* end = lineFeed == std::string_view::npos ? m_scanner.end : m_scanner.begin + lineFeed + 1;
-    CopySource({m_scanner.begin, end}, column);
+    CopySource({m_scanner.begin, end}, column, m_anchor);
     m_scanner.begin = end;
     StripIndentation(indent);
   }

@@ -40,14 +40,18 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
       m_tokenText(text.begin, text.begin),
       m_pendingBegin(text.begin),
       m_settled(text.begin) {
-  if (nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
-  if (nesting == 0) parts = 0;
-  if (++parts > expansionLimits.parts) throw LexScannerException("Too many macro expansions", text.begin);
-  CheckLength(text.Size());
+  CheckPart(text);
   ++nesting;
 }
 
 ExpansionContext::~ExpansionContext() { --nesting; }
+
+void ExpansionContext::CheckPart(const TextRange& text) const {
+  if (nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
+  if (nesting == 0) parts = 0;
+  if (++parts > expansionLimits.parts) throw LexScannerException("Too many macro expansions", text.begin);
+  CheckLength(text.Size());
+}
 
 void ExpansionContext::Run() {
   RunToEnd();
@@ -70,11 +74,15 @@ void ExpansionContext::RunToEnd() {
     if (m_here < m_scanner.end && IsBlankByte(*m_here)) SkipToToken();
     LexToken token;
     ReadToken(m_scanner, token, true);
+    if (IsPlainToken(token)) {
+      if (token.kind == kEndOfText) return;
+      m_settled = m_scanner.begin;
+      continue;
+    }
+    m_isPlain = false;
     switch (token.kind) {
-      case kEndOfText:
-        return;
       case kIdentifier:
-        if (NamesInUse::MayHold(token.text.View())) ExpandIdentifier(token);
+        ExpandIdentifier(token);
         break;
       case kDoubleQuoted:
         SubstituteInString(token);
@@ -103,6 +111,7 @@ void ExpansionContext::SkipToToken() {
     if (*at != '\n') break;
     m_settled = at + 1;
     if (m_stripIndent > 0) {
+      m_isPlain = false;
       m_scanner.begin = m_settled;
       Settle();
       StripIndentation(m_stripIndent);
@@ -123,7 +132,7 @@ void ExpansionContext::ExpandIdentifier(const LexToken& token) {
 
 void ExpansionContext::SubstituteInString(const LexToken& token) {
   const LSFileFrame* fileFrame = m_frame.FileFrame();
-  if (!fileFrame || token.text.View().find("$(") == std::string_view::npos) return;
+  if (!fileFrame) return;
   m_tokenText = token.text;
   std::string text = token.text.Text();
   try {
@@ -186,13 +195,13 @@ bool ExpansionContext::ExpandPredefined(const LexToken& name) {
 // --- Output
 
 void ExpansionContext::FlushTo(const char* position) {
-  if (m_pendingBegin < position) CopySource({m_pendingBegin, position}, m_outIndent);
+  if (m_pendingBegin < position) CopySource({m_pendingBegin, position}, m_outIndent, m_anchor);
   m_pendingBegin = position;
 }
 
-void ExpansionContext::CopySource(const TextRange& text, LineIndent indent) {
-  if (m_anchor) {
-    m_sink.WriteGenerated(text.View(), m_anchor->begin, indent);
+void ExpansionContext::CopySource(const TextRange& text, LineIndent indent, const TextRange* anchor) {
+  if (anchor) {
+    m_sink.WriteGenerated(text.View(), anchor->begin, indent);
   } else {
     m_sink.WriteVerbatim(text, indent);
   }

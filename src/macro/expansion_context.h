@@ -25,6 +25,8 @@ class ExpansionContext {
   ExpansionContext(const ExpansionContext&) = delete;
   ExpansionContext& operator=(const ExpansionContext&) = delete;
   void Run();
+  // After Run: every token is plain, whatever frame it is looked up in.
+  bool WasPlain() const { return m_isPlain; }
   bool RunUnlessPlain();  // false: nothing in the text is to be changed, and nothing was written but the map
 
  private:
@@ -44,6 +46,7 @@ class ExpansionContext {
   void DropTo(const char* position);
   void DropToScanner() { DropTo(m_scanner.begin); }
   void EmitGenerated(std::string_view text);
+  void CheckPart(const TextRange& text) const;
   void CheckLength(size_t added) const;
   LineIndent CurrentColumn() const { return m_sink.AtLineStart() ? m_outIndent : m_sink.ColumnHere(); }
   const TextRange* AnchorForTemporary() const { return m_anchor ? m_anchor : &m_tokenText; }
@@ -53,7 +56,8 @@ class ExpansionContext {
   // --- Expansion of parts of the text
   void ExpandBlock(const TextRange& block, LSFrame& frame, int indent, LineIndent column);
   std::string ExpandPart(const TextRange& part, int64_t stripIndent = 0);  // in a child frame
-  void CopySource(const TextRange& text, LineIndent indent);               // to the sink, as it stands
+  // To the sink, as it stands.
+  void CopySource(const TextRange& text, LineIndent indent, const TextRange* anchor);
   LexToken Next() { return NextToken(m_scanner); }
   LexToken RequireIdentifier(std::string_view message);  // fails with the message and the token
   [[noreturn]] void FailAt(const LexToken& token, std::string message) const;
@@ -106,6 +110,7 @@ class ExpansionContext {
   struct BoundArgument {
     const MacroFormal* formal;
     TextRange text;
+    bool isPlain;
   };
   void CallVariable(LSVariable& variable);
   void CallMacro(const LSMacroVariable& macro);
@@ -114,6 +119,8 @@ class ExpansionContext {
   BoundArguments ReadArguments(const LSMacroVariable& macro);
   void BindArgument(LSFrame& frame, const BoundArgument& argument, const LSMacroVariable& macro);
   void RunBody(const LSMacroVariable& macro, LSFrame& frame);
+  void ExpandBody(const LSMacroVariable& macro, LSFrame& frame);
+  void CopyBody(const LSMacroVariable& macro);
 
   // --- @for
   struct Loop;
@@ -133,7 +140,24 @@ class ExpansionContext {
   const char* m_here = nullptr;  // where that token begins
   const char* m_pendingBegin;
   const char* m_settled;
+  bool m_isPlain = true;
 };
+
+// Whether nothing can be expanded in a text of such tokens alone, as long as no new name comes up.
+inline bool IsPlainToken(const LexToken& token) {
+  switch (token.kind) {
+    case kIdentifier:
+      return !NamesInUse::MayHold(token.text.View());
+    case kDoubleQuoted:
+      return token.text.View().find("$(") == std::string_view::npos;
+    case kMacroComment:
+    case kAt:
+    case kBackquote:
+      return false;
+    default:
+      return true;
+  }
+}
 
 // Expansion into a string of its own; no map is kept.
 std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor);

@@ -22,6 +22,38 @@ class LSFileFrame;
 enum class VarType : int32_t { Macro = 1, Bool, Int, Double, Char, String };
 VarType TypeCodeOf(std::string_view word);  // Macro: no type keyword
 
+// Which names stand in any frame of the process, roughly: the lengths that begin with each byte, and a bit for some
+// more of a name's bytes. Most words of a text are no names, and are told so without a look into the frames.
+class NamesInUse {
+ public:
+  static bool MayHold(std::string_view name) {
+    if ((m_lengths[FirstOf(name)] >> (name.size() % 64) & 1) == 0) return false;
+    const size_t bit = BitOf(name);
+    return (m_bits[bit / 64] >> (bit % 64) & 1) != 0;
+  }
+  static void Add(std::string_view name) {
+    if (MayHold(name)) return;
+    m_lengths[FirstOf(name)] |= uint64_t{1} << (name.size() % 64);
+    const size_t bit = BitOf(name);
+    m_bits[bit / 64] |= uint64_t{1} << (bit % 64);
+    ++m_changes;
+  }
+  static uint64_t Changes() { return m_changes; }  // as long as it stays, so do the answers
+
+ private:
+  static constexpr size_t kBits = 16384;
+  static unsigned char ByteOf(std::string_view name, size_t at) { return static_cast<unsigned char>(name[at]); }
+  static unsigned char FirstOf(std::string_view name) { return name.empty() ? 0 : ByteOf(name, 0); }
+  static size_t BitOf(std::string_view name) {
+    if (name.empty()) return 0;
+    const size_t last = name.size() - 1;
+    return ((ByteOf(name, 0) * size_t{31} + ByteOf(name, last)) * 31 + ByteOf(name, last / 2) * 7 + last) % kBits;
+  }
+  static inline uint64_t m_lengths[256];
+  static inline uint64_t m_bits[kBits / 64];
+  static inline uint64_t m_changes = 0;
+};
+
 class LSVariable {
  public:
   virtual ~LSVariable() = default;
@@ -51,6 +83,9 @@ class LSMacroVariable : public LSVariable {
   // Makes name, formals and body refer to a copy of `text`, in which they lie now.
   void OwnText(TextRange text);  // by value: it may be one of them
   void OwnBody();                // the same for the body alone
+  // Nothing in the body is to be expanded, so that it can be copied. Forgotten when a name comes up that is new.
+  bool HasPlainBody() const { return m_plainAsOf == NamesInUse::Changes(); }
+  void SetPlainBody() const { m_plainAsOf = NamesInUse::Changes(); }
 
   bool isPython = false;
   bool isNaked = false;
@@ -62,6 +97,10 @@ class LSMacroVariable : public LSVariable {
   int stripIndent = 0;
   TextRange body;
   std::shared_ptr<const std::string> ownedText;
+
+ private:
+  static constexpr uint64_t kNever = ~uint64_t{0};
+  mutable uint64_t m_plainAsOf = kNever;
 };
 
 class LSValueVariable : public LSVariable {
@@ -84,34 +123,6 @@ class LSVar : public LSValueVariable {
   LSVar(std::string name, VarType type, std::string value);
   std::unique_ptr<LSVariable> Clone() const override;
   const std::string ownName;
-};
-
-// Which names stand in any frame of the process, roughly: the lengths that begin with each byte, and a bit for some
-// more of a name's bytes. Most words of a text are no names, and are told so without a look into the frames.
-class NamesInUse {
- public:
-  static bool MayHold(std::string_view name) {
-    if ((m_lengths[FirstOf(name)] >> (name.size() % 64) & 1) == 0) return false;
-    const size_t bit = BitOf(name);
-    return (m_bits[bit / 64] >> (bit % 64) & 1) != 0;
-  }
-  static void Add(std::string_view name) {
-    m_lengths[FirstOf(name)] |= uint64_t{1} << (name.size() % 64);
-    const size_t bit = BitOf(name);
-    m_bits[bit / 64] |= uint64_t{1} << (bit % 64);
-  }
-
- private:
-  static constexpr size_t kBits = 16384;
-  static unsigned char ByteOf(std::string_view name, size_t at) { return static_cast<unsigned char>(name[at]); }
-  static unsigned char FirstOf(std::string_view name) { return name.empty() ? 0 : ByteOf(name, 0); }
-  static size_t BitOf(std::string_view name) {
-    if (name.empty()) return 0;
-    const size_t last = name.size() - 1;
-    return ((ByteOf(name, 0) * size_t{31} + ByteOf(name, last)) * 31 + ByteOf(name, last / 2) * 7 + last) % kBits;
-  }
-  static inline uint64_t m_lengths[256];
-  static inline uint64_t m_bits[kBits / 64];
 };
 
 // A scope of names. Child frames come and go with every body and expression, so one without definitions owns nothing,

@@ -15,6 +15,10 @@ void ExpansionContext::CallVariable(LSVariable& variable) {
   const auto& macro = static_cast<const LSMacroVariable&>(variable);
   // What the body defines may replace the entry, but a frame keeps its variables to its end.
   if (macro.isFunctionArgument) return CallFunctionArgument(macro);
+  if (macro.formals.empty() && macro.HasPlainBody()) {
+    DropToScanner();
+    return CopyBody(macro);
+  }
   CallMacro(macro);
 }
 
@@ -27,13 +31,15 @@ ExpansionContext::BoundArguments ExpansionContext::ReadArguments(const LSMacroVa
   }
   for (const MacroFormal& formal : macro.formals) {
     TextRange text;
-    const LexToken end = ReadArgument(m_scanner, text, kCloseParen);
+    bool isPlain = true;
+    const LexToken end = ReadArgument(m_scanner, text, kCloseParen,
+                                      [&](const LexToken& token) { isPlain = isPlain && IsPlainToken(token); });
     const bool isLast = &formal == &macro.formals.back();
     if (!isLast && end.kind == kCloseParen) {
       FailAt(end, "Insufficient arguments provided for macro " + macro.Signature());
     }
     if (isLast && end.kind == kComma) FailAt(end, "Too many arguments provided for macro " + macro.Signature());
-    arguments.push_back({&formal, text});
+    arguments.push_back({&formal, text, isPlain});
   }
   return arguments;
 }
@@ -60,6 +66,7 @@ void ExpansionContext::BindArgument(LSFrame& frame, const BoundArgument& argumen
   variable->homeFrame = &m_frame;
   variable->isFunctionArgument = formal.isFunction;
   variable->isTemporary = m_anchor != nullptr;
+  if (argument.isPlain) variable->SetPlainBody();
   // An argument of a naked macro stays in the frame, which may outlive the text.
   if (m_anchor && macro.isNaked) variable->OwnBody();
   frame.AddVariable(std::move(variable));
@@ -99,9 +106,21 @@ void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
     const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
     EmitGenerated(EvaluateAsText(frame, macro.body, macro.resultType, anchor));
   } else if (!macro.body.Empty()) {
-    const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
-    ExpansionContext(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor).Run();
+    ExpandBody(macro, frame);
   }
+}
+
+void ExpansionContext::ExpandBody(const LSMacroVariable& macro, LSFrame& frame) {
+  if (macro.HasPlainBody()) return CopyBody(macro);
+  const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
+  ExpansionContext body(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor);
+  body.Run();
+  if (body.WasPlain()) macro.SetPlainBody();
+}
+
+void ExpansionContext::CopyBody(const LSMacroVariable& macro) {
+  CheckPart(macro.body);
+  CopySource(macro.body, CurrentColumn(), macro.isTemporary ? AnchorForTemporary() : nullptr);
 }
 
 void ExpansionContext::CallFunctionArgument(const LSMacroVariable& macro) {
