@@ -35,26 +35,32 @@ int32_t ScanLongToken(LexScanner& scanner);
 // The next token. White space is skipped, comments (kComment) too unless kept; kMacroComment is always returned. At the
 // end of the text: kEndOfText, again and again. Throws LexScannerException.
 inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+  const char* at = scanner.begin;  // as in the skips above
+  const char* const end = scanner.end;
   do {
-    SkipWhiteSpace(scanner);
-    token.text.begin = scanner.begin;
-    if (scanner.AtEnd()) {
+    while (at < end && IsBlankByte(*at)) ++at;
+    token.text.begin = at;
+    if (at >= end) {
       token.kind = kEndOfText;
     } else {
-      const char c = *scanner.begin;
+      const char c = *at;
       const uint8_t byteClass = ByteClassOf(c);
       if (byteClass == kLetterByte && c != 'r' && c != 'R') {  // these may begin a raw string
-        SkipWord(scanner);
+        do ++at;
+        while (at < end && IsIdentifierPart(*at));
         token.kind = kIdentifier;
       } else if (byteClass == kSingleByte) {
-        ++scanner.begin;
+        ++at;
         token.kind = SingleToken(c);
       } else {
-        token.kind = ScanLongToken(scanner);
+        LexScanner rest(TextRange(at, end));
+        token.kind = ScanLongToken(rest);
+        at = rest.begin;
       }
     }
-    token.text.end = scanner.begin;
+    token.text.end = at;
   } while (token.kind == kComment && !keepComments);
+  scanner.begin = at;
 }
 
 inline LexToken NextToken(LexScanner& scanner, bool keepComments = false) {
@@ -73,15 +79,19 @@ class ParserBase {
   void Advance();
   template <typename Stop>
   void AdvanceUntil(Stop stop) {  // at least once, to the next token that `stop` takes
-    LexScanner ahead = scanner;
-    LexToken tokens[2] = {current, current};  // in turn: nothing is copied on the way
-    size_t last = 0;
+    LexScanner ahead = scanner;   // copies: they stay in registers
+    LexToken token = current;
+    const char* before;
     do {
-      last ^= 1;
-      ReadToken(ahead, tokens[last]);
-    } while (!stop(tokens[last]));
-    previous = tokens[last ^ 1];
-    current = tokens[last];
+      before = token.text.begin;
+      ReadToken(ahead, token);
+    } while (!stop(token));
+    previous = current;
+    if (before != current.text.begin) {  // read once more: nothing is kept on the way
+      LexScanner again(TextRange(before, ahead.end));
+      ReadToken(again, previous);
+    }
+    current = token;
     scanner = ahead;
   }
   void Expect(int32_t kind, std::string_view what);

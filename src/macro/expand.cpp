@@ -69,16 +69,8 @@ bool ExpansionContext::RunUnlessPlain() {
 }
 
 void ExpansionContext::RunToEnd() {
-  for (;;) {
-    m_here = m_scanner.begin;
-    if (m_here < m_scanner.end && IsBlankByte(*m_here)) SkipToToken();
-    LexToken token;
-    ReadToken(m_scanner, token, true);
-    if (IsPlainToken(token)) {
-      if (token.kind == kEndOfText) return;
-      m_settled = m_scanner.begin;
-      continue;
-    }
+  LexToken token;
+  while (ReadPastPlain(token)) {
     m_isPlain = false;
     switch (token.kind) {
       case kIdentifier:
@@ -99,27 +91,43 @@ void ExpansionContext::RunToEnd() {
       default:
         break;
     }
-    m_settled = m_scanner.begin;
   }
 }
 
-// To the begin of the next token, which `m_here` keeps. Every line but the first loses up to `m_stripIndent` columns.
-void ExpansionContext::SkipToToken() {
-  const char* at = m_scanner.begin;
-  for (; at < m_scanner.end; ++at) {
-    if (*at == ' ' || *at == '\t') continue;
-    if (*at != '\n') break;
-    m_settled = at + 1;
-    if (m_stripIndent > 0) {
-      m_isPlain = false;
-      m_scanner.begin = m_settled;
-      Settle();
-      StripIndentation(m_stripIndent);
-      DropToScanner();
-      at = m_scanner.begin - 1;
+// To the next token that is not plain; false: there is none.
+bool ExpansionContext::ReadPastPlain(LexToken& found) {
+  LexScanner ahead = m_scanner;  // a copy, and the token too: they stay in registers
+  LexToken token;
+  do {
+    m_settled = ahead.begin;
+    if (m_stripIndent > 0 && !ahead.AtEnd() && IsBlankByte(*ahead.begin)) {
+      m_scanner = ahead;
+      SkipToToken();
+      ahead = m_scanner;
     }
+    ReadToken(ahead, token, true);
+  } while (IsPlainToken(token));
+  m_here = token.text.begin;
+  for (const char* at = m_here; at > m_settled; --at) {
+    if (at[-1] == '\n') m_settled = at;
   }
-  m_here = m_scanner.begin = at;
+  m_scanner = ahead;
+  found = token;
+  return token.kind != kEndOfText;
+}
+
+// To the begin of the next token. Every line but the first loses up to `m_stripIndent` columns.
+void ExpansionContext::SkipToToken() {
+  for (; !m_scanner.AtEnd(); ++m_scanner.begin) {
+    if (*m_scanner.begin == ' ' || *m_scanner.begin == '\t') continue;
+    if (*m_scanner.begin != '\n') break;
+    m_isPlain = false;
+    m_settled = ++m_scanner.begin;
+    Settle();
+    StripIndentation(m_stripIndent);
+    DropToScanner();
+    --m_scanner.begin;
+  }
 }
 
 void ExpansionContext::ExpandIdentifier(const LexToken& token) {

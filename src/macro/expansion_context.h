@@ -34,6 +34,7 @@ class ExpansionContext {
 
   // --- Loop
   void RunToEnd();
+  bool ReadPastPlain(LexToken& found);
   void SkipToToken();
   void ExpandIdentifier(const LexToken& token);
   void SubstituteInString(const LexToken& token);
@@ -153,6 +154,7 @@ inline bool IsPlainToken(const LexToken& token) {
     case kMacroComment:
     case kAt:
     case kBackquote:
+    case kEndOfText:
       return false;
     default:
       return true;

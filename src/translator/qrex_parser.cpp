@@ -73,7 +73,7 @@ void QrexParser::Translate() {
   const auto isActedOn = [checksIncludes](const LexToken& token) {
     switch (token.kind) {
       case kIdentifier:
-        return token.Is("using") || token.Is("namespace");
+        return (*token.text.begin == 'u' && token.Is("using")) || (*token.text.begin == 'n' && token.Is("namespace"));
       case kHash:
         return checksIncludes;
       case kAt:
