@@ -48,6 +48,8 @@ TEST_F(DirectivesTest, Calls) {
       {"@def bool odd(int x) = x % 2 == 1\nodd(3)odd(4)", "truefalse"},
       {"@def char c(string s) = @str(s)[1]\nc(\"xyz\")", "'y'"},
       {"@def apply(f(), v) = f(v)\n@def sq(x) = (x*x)\napply(sq, 3)", "(3*3)"},
+      {"@def w = zebra\nw w\n@def zebra = 1\nw", "zebra zebra\n1"},  // plain until there is such a name
+      {"@def k(x) = { x x @scope { @def+ zebu = {2} } x }\nk(zebu)", " zebu zebu  2 "},
       {"@def twice(f()) = f(f(1))\n@def g(x) = <x>\ntwice(g)", "<<1>>"},
   });
 }
