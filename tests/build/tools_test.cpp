@@ -203,16 +203,19 @@ TEST_F(ToolsTest, CompilerCommandLines) {
   for (const auto& [compiler, expected] : cases) {
     Builder(compiler);
     ASSERT_TRUE(CompileFile(*builder, builder->GetScannedFile(source)));
+    ASSERT_EQ("", trace);
     ASSERT_EQ(expected, TakeLog());
     ASSERT_FALSE(FileExists("x64/Debug/app/compiler.rsp"));
   }
   app.usesQrex = false;
-  Builder(CompilerKind::gcc);
+  settings.diagnostics = true;
+  Builder(CompilerKind::clang);
   CompileFile(*builder, builder->GetScannedFile(source));
   ASSERT_EQ(
-      "gcc-4 -c @x64/Debug/app/compiler.rsp\n -g -DA=\"b c\" -I\"tree/app\" -I\"tree/app/src\" -I\"tree\""
-      " -o \"x64/Debug/app/x.o\" \"tree/app/src/x.cpp\"\n",
-      TakeLog());
+      "Compiling app/src/x.cpp\nx64/Debug/app/compiler.rsp =  -g -DA=\"b c\" -I\"tree/app\" -I\"tree/app/src\""
+      " -I\"tree\" -o \"x64/Debug/app/x.o\" \"tree/app/src/x.cpp\"\n"
+      "cmd /c gcc-4 -c @\"x64/Debug/app/compiler.rsp\" 1>out1.txt 2>&1\n",
+      trace);
 }
 
 TEST_F(ToolsTest, AssemblersAndResources) {

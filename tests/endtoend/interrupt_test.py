@@ -1,6 +1,6 @@
 #!/usr/bin/env python3
-"""Kills the tool at random points of its runs. The run after must complete, end with the same files as an undisturbed
-run, and leave nothing to do for the next one.
+"""Kills the tool at random points of its runs. No file is half-written. The run after must complete, end with the same
+files as an undisturbed run, and leave nothing to do for the next one.
 
 interrupt_test.py BINARY [ROUNDS]: kills per kind of run, 15 unless given."""
 
@@ -17,6 +17,7 @@ from workspace_fixture import SETTINGS, Workspace, need, run_tests  # noqa: E402
 
 ROUNDS = int(sys.argv[2]) if len(sys.argv) > 2 else 15
 PROJECTS = 8
+WHOLE = ("qrexsource/", "out/include/", "out/source/")  # what the tool itself writes
 
 
 def files():
@@ -89,6 +90,9 @@ def killed_runs(binary, arguments, check=lambda workspace: None):
                 time.sleep(delay)
                 os.killpg(process.pid, 9)
                 process.wait()
+                torn = [name for name, content in outputs(workspace.folder).items() if name.startswith(WHOLE)
+                        and not name.endswith(".part") and content != expected[name]]
+                assert not torn, f"killed after {delay:.3f} s: {torn} are half-written"
             workspace.run("all.qrex", *arguments)
             got = outputs(workspace.folder)
             of_ar = re.compile(r"out/lib/.*/st\w{6}$")  # the librarian's own temporary file

@@ -16,7 +16,7 @@ import tempfile
 import time
 import zlib
 
-from workspace_fixture import Skipped, holds, lacks, need, run_tests
+from workspace_fixture import Skipped, holds, lacks, run_tests
 
 BINARY = os.path.abspath(sys.argv[1])
 CONFIG = '''virtualTree = { "tree" }
@@ -512,36 +512,6 @@ def without_times(files):
     return {path: content for path, content in files.items() if path not in EACH_RUN}
 
 
-def test_killed_at_any_point():
-    big = ''.join(f'int x{n};\n' for n in range(20000))
-    changes = {'tree/app/c.h': big, 'tree/app/src/y.cpp': '@import "app/c.h"\n$init { }\n' + big}
-    write_tree(changes)
-    begin = time.time()
-    run()
-    duration = time.time() - begin
-    wanted = without_times(contents('qrexsource', 'out'))
-    identifiers = read('projects.guids')
-    runs = 24
-    for i in range(runs):
-        if i % 4 == 0:
-            subprocess.run('rm -rf qrexsource out', shell=True)
-        edit('tree/app/c.h', big)  # the same text, but later
-        process = subprocess.Popen([BINARY, 'main.qrex'], stdout=subprocess.DEVNULL)
-        time.sleep(duration * 1.1 * i / runs)
-        process.kill()
-        process.wait()
-        for path, content in without_times(contents('qrexsource', 'out')).items():
-            expect(path.endswith('.part') or content == wanted[path], f'half-written: {path}')
-        if os.path.exists(DEPENDENCIES):
-            dependencies()
-        expect(read('projects.guids') == identifiers, 'identifiers')
-    run()
-    expect(without_times(contents('qrexsource', 'out')) == wanted, 'the next run recovers')
-    before = times('.')
-    run()
-    expect(set(changed(before, times('.'))) <= EACH_RUN, 'and is complete')
-
-
 def test_leftovers_of_killed_runs_are_removed():
     write_tree()
     run()
@@ -571,36 +541,6 @@ def test_runs_at_the_same_time():
             text = process.communicate()[0]
             expect(process.returncode == 0 and 'rror' not in text and 'failed' not in text, text)
         expect(without_times(contents('qrexsource', 'out')) == wanted and not leftovers(), leftovers())
-
-
-# --- With a compiler
-
-def test_compile_and_link():
-    need('g++')
-    write_tree({
-        'tree/ws/all.qrws': '"all" { "app" "prog" { "app" } }',
-        'tree/app/a.h': 'int f();\n', 'tree/app/src/x.cpp': '@import "app/a.h"\nint f() { return 42; }\n',
-        'tree/app/src/app.qrpj': PROJECT + '{ "a.h" "src" { "x.cpp" } }',
-        'tree/prog/src/prog.qrpj': '$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "prog"\n'
-                                   'config { "Debug|x64" }\nqrex\n{ "src" { "main.cpp" } }',
-        'tree/prog/src/main.cpp': '@import "app/a.h"\nint main() { return f(); }\n'})
-    text = run('main.qrex', 'translateOnly=false')
-    holds(text, 'Linking...\napp....', 'Linking...\nprog....', '\nCompleted....')
-    expect(subprocess.run(['out/lib/x64/Debug/prog']).returncode == 42, 'the program')
-    before = times('.')
-    text = run('main.qrex', 'translateOnly=false')
-    lacks(text, 'Linking')
-    touched = changed(before, times('.'))
-    expect(set(touched) <= EACH_RUN | {'qrexsource/x64/Debug/prog.qrexdep'}, touched)
-    edit('tree/app/src/x.cpp', '@import "app/a.h"\nint f() { return 43; }\n')
-    run('main.qrex', 'translateOnly=false')
-    expect(subprocess.run(['out/lib/x64/Debug/prog']).returncode == 43, 'linked again with the new library')
-    edit('tree/prog/src/main.cpp', '@import "app/a.h"\n\nint main() { return g(); }\n')
-    text = run('main.qrex', 'translateOnly=false')
-    holds(text, 'tree/prog/src/main.cpp(3) ...\n', 'qrexsource/x64/Debug/prog/src/main.cpp:3:',
-          '\nCompleted with 0 warnings, 1 errors.')
-    lacks(text, 'Linking')
-    lacks(text, '\nprog....')
 
 
 def in_folder(test):

@@ -150,38 +150,6 @@ def libraries_and_a_program(workspace):
 
 
 @in_workspace(all_files)
-def command_lines(workspace):
-    output = workspace.run("all.qrex", "diagnostics=true")
-    includes = lambda project: "".join(f' /I "{path}"' for path in (  # noqa: E731
-        f"qrexsource/Win64/Debug/{project}", f"qrexsource/Win64/Debug/{project}/src", "qrexsource/Win64/Debug", "tree"))
-    switches = '/GS- /Zl /D "LEVEL=7" /D "base_STATIC_LIBRARY" /nologo /W3 '
-    holds(output,
-          "Compiling base/src/StdAfx.cpp\n",
-          f'Win64/Debug/base/compiler.rsp = {switches}/Yc"StdAfx.h" {includes("base")} /Fp"Win64/Debug/base/base.pch" '
-          '/Fo"Win64/Debug/base/" /Fd"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/StdAfx.cpp"\n',
-          'cmd /c cl /c @"Win64/Debug/base/compiler.rsp" 1>out1.txt\n',
-          "Compiling base/src/level.cpp\n", f'= {switches}/Yu"StdAfx.h" {includes("base")} ',
-          "Assembling base/src/twice.asm\n",
-          'Win64/Debug/base/masm.rsp =  /Fo"Win64/Debug/base/" "qrexsource/Win64/Debug/base/src/twice.asm"\n'
-          'cmd /c ml64 /c /Cx /nologo @"Win64/Debug/base/masm.rsp" 1>out1.txt\n',
-          "Linking...\n",
-          'Win64/Debug/base/linker.rsp =  /OUT:"out/lib/Win64/Debug/base.lib" "Win64/Debug/base/StdAfx.obj" '
-          '"Win64/Debug/base/level.obj" "Win64/Debug/base/base.obj" "Win64/Debug/base/twice.obj"\n'
-          'lib.exe @"Win64/Debug/base/linker.rsp"\n',
-          "Compiling resource file shape/src/shape.rc\n",
-          'rc.exe  /fo"Win64/Debug/shape/shape.res" "tree/shape/src/shape.rc"\n',
-          "Win64/Debug/shape/linker.rsp =  /DLL /NOENTRY /NODEFAULTLIB", ' "Win64/Debug/shape/shape.res"',
-          "Embedding manifest...\n"
-          '/outputresource:"out/lib/Win64/Debug/shape.dll";#2 /manifest '
-          '"./Win64/Debug/shape/shape.dll.intermediate.manifest"\n'
-          'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\n',
-          '"Win64\\Debug\\shape\\mtdep.bat"\n',
-          ' "Win64/Debug/app/app.obj" "out/lib/Win64/Debug/base.lib" "out/lib/Win64/Debug/shape.lib"\n'
-          'link.exe @"Win64/Debug/app/linker.rsp"\n',
-          '/outputresource:"out/lib/Win64/Debug/app.exe";#1 /manifest ')
-
-
-@in_workspace(all_files)
 def messages_are_counted_and_point_at_the_source(workspace):
     workspace.append("tree/base/src/base.cpp", "\nint Narrow()\n{\n    int unset;\n    return unset;\n}\n")
     workspace.append("tree/base/src/level.cpp", "int Broken()\n{\n    return nowhere;\n}\n")
@@ -230,7 +198,6 @@ def failing_steps_are_counted_and_the_next_run_recovers(workspace):
 
 run_tests([
     libraries_and_a_program,
-    command_lines,
     messages_are_counted_and_point_at_the_source,
     failing_steps_are_counted_and_the_next_run_recovers,
 ])

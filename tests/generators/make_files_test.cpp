@@ -226,26 +226,6 @@ TEST_F(MakeFilesTest, WorkspaceAndTop) {
                              "rtranslate2:\n\tmake translate2 -f make_all_x64_Release\n\n");
 }
 
-TEST_F(MakeFilesTest, WritesWhatDiffersAndNothingForAnEmptyWorkspace) {
-  AddProject("app", "Application", "{ }");
-  Load("app/src/app.qrpj");
-  Generate();
-  ReplaceFile("makefile", "all:\n");
-  trace.clear();
-  Generate();
-  ASSERT_EQ(
-      "Skipping make_app_x64_Debug\nSkipping make_app_x64_Release\nSkipping app.cbp\nSkipping make_all_x64_Debug\n"
-      "Skipping make_all_x64_Release\nWriting makefile\nSkipping all.make\nSkipping all.workspace\nSkipping "
-      "all.geany\n",
-      trace);
-  workspace->projects.clear();
-  std::filesystem::remove("makefile");
-  trace.clear();
-  GenerateWorkspaceFile(*workspace, false);
-  ASSERT_EQ("", trace);
-  ASSERT_FALSE(FileExists("makefile"));
-}
-
 }  // namespace
 
 }  // namespace qrex
