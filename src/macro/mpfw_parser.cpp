@@ -36,7 +36,9 @@ MpfwSourceFile* MpfwParser::LoadSourceFile(const std::string& path, const std::s
   std::unique_ptr<MpfwSourceFile> made = CreateSourceFile();
   MpfwSourceFile& file = *made;
   file.path = path;
-  file.text = std::move(text) + extraText;
+  file.text = std::move(text);
+  if (!extraText.empty() && !file.text.empty() && file.text.back() != '\n') file.text += '\n';  // lines of their own
+  file.text += extraText;
   context.sourceFiles.push_back(std::move(made));  // ahead of the expansion, so that its errors are found in it
   return ExpandSourceFile(file) ? &file : nullptr;
 }

@@ -43,7 +43,8 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   virtual bool ResolveImport(const std::string& path, std::string& found) = 0;
   virtual void OnImportedFile(MpfwSourceFile& file) = 0;
 
-  // Null if the macro expansion failed (already reported). Throws "Couldn't open file ".
+  // Null if the macro expansion failed (already reported). Throws "Couldn't open file ". The extra text stands on lines
+  // of its own behind the file.
   MpfwSourceFile* LoadSourceFile(const std::string& path, const std::string& extraText = {});
 
   void SubstituteVariables(std::string& text) const;

@@ -57,8 +57,9 @@ TEST_F(ConfigTest, Keys) {
       "compiler = winegcc mode = show\n"
       "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true\n"
       "exportPublicHeaders = false repackageExecutableTargets = false solutionContainsPrepackagedProjects = false\n"
-      "makeTranslatedFilesReadOnly = false makeExportedHeaderFilesReadOnly = false writeTokenEquivalent = false",
-      "\nmode=clean\n");
+      "makeTranslatedFilesReadOnly = false makeExportedHeaderFilesReadOnly = false writeTokenEquivalent = false // the "
+      "end",
+      "mode=clean\n");
   EXPECT_EQ("[a][bc][d]", Joined(Got().virtualTree));
   EXPECT_EQ("[w]", Joined(Got().workspaces));
   EXPECT_EQ("New P N R V 8", Got().config + " " + Got().platform + " " + Got().systemName + " " +

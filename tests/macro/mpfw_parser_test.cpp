@@ -59,7 +59,7 @@ class MpfwParserTest : public ::testing::Test, public TraceHook {
 TEST_F(MpfwParserTest, LoadsAndImports) {
   AddFile("a", "@import \"b\"\r\n@importpath \"$(p)\\\\q/\"\r@$p = \"1\"@importpath (\"$\" + \"(p)\")\nf");
   AddFile("b", "@def f = imported\n@$p = \"0\"\n");
-  EXPECT_EQ("@import \"b\"\n\n\nimported g", Load("a", " g"));
+  EXPECT_EQ("@import \"b\"\n\n\nimported\n g", Load("a", " g"));
   EXPECT_EQ((std::vector<std::string>{"0/q", "1"}), context.importPaths);
   EXPECT_EQ(2u, sources.size());
   EXPECT_EQ("", trace);
