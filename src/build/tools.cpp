@@ -19,8 +19,8 @@ std::vector<std::string> IncludePaths(const Project& project, const ProjectConfi
   return paths;
 }
 
-std::string CompiledPath(const Project& project, const ProjectConfig& config, const ProjectFile& file) {
-  return (project.usesQrex ? TranslationDirectory(config) : project.rootDir) + "/" + file.path;
+std::string CompiledDirectory(const Project& project, const ProjectConfig& config) {
+  return project.usesQrex ? TranslationDirectory(config) : project.rootDir;
 }
 
 std::string_view GccTargetExtension(TargetType type) {

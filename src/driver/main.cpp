@@ -2,6 +2,7 @@
 #include <vector>
 
 #include "driver/command_line.h"
+#include "platform/console.h"
 #include "platform/system.h"
 
 namespace {
@@ -15,6 +16,8 @@ int main(int argc, char** argv) {
   const std::vector<std::string> arguments(argv, argv + argc);
   int status = 1;
   qrex::platform::TuneHeap();
+  qrex::platform::BufferStdout();
   qrex::platform::RunOnStack(kStackSize, [&] { status = qrex::RunCommandLine(arguments); });
+  qrex::platform::FlushStdout();
   return status;
 }

@@ -1,5 +1,8 @@
 #include "driver/run_workspace.h"
 
+#include <string>
+#include <unordered_set>
+
 #include "build/project_builder.h"
 #include "generators/exported_project.h"
 #include "generators/generate.h"
@@ -28,7 +31,7 @@ class WorkspaceRun {
   bool LoadWorkspaceFile(const std::string& entry);
   bool RunProjects(ScopeTimer& timer);
   bool ProcessProject(Project& project);
-  void MakeDirectories(const Project& project) const;
+  void MakeDirectories(const Project& project);
   void CreateMissingFiles(Project& project) const;
   void Repackage(const Project& project) const;
   bool ProcessTranslated(Project& project);
@@ -44,6 +47,7 @@ class WorkspaceRun {
   int64_t m_errors = 0;
   int64_t m_warnings = 0;
   bool m_anyTranslated = false;
+  std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
 };
 
 std::string PrintedList(const std::vector<std::string>& entries) {
@@ -154,7 +158,11 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
 
 bool WorkspaceRun::ProcessProject(Project& project) {
   MakeDirectories(project);
-  CopyIfNewer(PathJoin(project.rootDir, kMarkerFile), m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false);
+  const std::string marker = PathJoin(project.rootDir, kMarkerFile);
+  if (!m_prepared.contains(marker) &&
+      CopyIfNewer(marker, m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false)) {
+    m_prepared.insert(marker);
+  }
   if (m_settings.mode == RunMode::Gen) {
     project.CollectFiles();
     if (!project.exported) CreateMissingFiles(project);
@@ -176,17 +184,20 @@ bool WorkspaceRun::ProcessProject(Project& project) {
   return true;
 }
 
-void WorkspaceRun::MakeDirectories(const Project& project) const {
+void WorkspaceRun::MakeDirectories(const Project& project) {
+  auto make = [this](const std::string& path) {
+    if (m_prepared.insert(path).second) CreateDirectories(path, true);
+  };
   for (const auto& config : project.configs) {
     if (!m_settings.translateOnly) {
-      CreateDirectories(config->platform + "/" + config->name + "/" + project.name, true);
+      make(config->platform + "/" + config->name + "/" + project.name);
     }
     if (project.exported || !IsLibrary(project.targetType)) continue;
     if (!m_settings.translateOnly) {
-      CreateDirectories(PathJoin3(m_settings.exportLib, config->platform, config->name), true);
+      make(PathJoin3(m_settings.exportLib, config->platform, config->name));
     }
-    CreateDirectories(m_settings.exportTranslatedInclude, true);
-    CreateDirectories(m_settings.exportUntranslatedInclude, true);
+    make(m_settings.exportTranslatedInclude);
+    make(m_settings.exportUntranslatedInclude);
   }
 }
 

@@ -72,10 +72,9 @@ void WriteSources(TextWriter& out, const Project& project) {
     out << "\t\t\t<Add option=\"-I" << path << "\" />\n";
   }
   out << "\t\t</Compiler>\n";
+  const std::string directory = isTranslated ? CompiledDirectory(project, config) : project.rootDir;
   for (const ProjectFile* file : project.files) {
-    if (!IsUnit(*file)) continue;
-    const std::string path = isTranslated ? CompiledPath(project, config, *file) : project.rootDir + "/" + file->path;
-    out << "\t\t<Unit filename=\"" << path << "\" />\n";
+    if (IsUnit(*file)) out << "\t\t<Unit filename=\"" << directory << "/" << file->path << "\" />\n";
   }
 }
 

@@ -71,8 +71,7 @@ void WriteExportedProject(Project& project) {
   const std::string path =
       PathJoin3(project.settings->exportUntranslatedInclude, project.sourceDir, project.name + ".qrpj");
   CreateDirectories(path, false);
-  ChangeReadOnly(path, false);
-  WriteIfChanged(out, path, ReadOnlyTarget::Replace);
+  UpdateFile(out, path, ReadOnlyTarget::Replace);
   ChangeReadOnly(path, true);
 }
 

@@ -1,6 +1,8 @@
 #include "generators/generate.h"
 
+#include <string>
 #include <type_traits>
+#include <unordered_set>
 
 #include "generators/codeblocks.h"
 #include "generators/common.h"
@@ -16,12 +18,20 @@ namespace qrex {
 
 namespace {
 
+// Of the project or workspace at hand. The gcc family has one form of its files, so that the pass with the prefix would
+// compose and compare them once more.
+std::unordered_set<std::string> upToDate;
+
 // Composes one file in memory and hands it over.
 template <typename... Args>
 void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args) {
+  if (upToDate.contains(path)) {
+    TraceWriter() << "Skipping " << path << "\n";
+    return;
+  }
   MemoryTextWriter out;
   write(out, args...);
-  WriteIfChanged(out, path);
+  if (UpdateFile(out, path) != FileUpdate::Failed) upToDate.insert(path);
 }
 
 std::string MakeFileName(const std::string& name, const ProjectConfig& config) {
@@ -51,6 +61,7 @@ void GenerateGccWorkspace(const Workspace& workspace) {
 }  // namespace
 
 void GenerateProjectFile(Project& project, bool buildPrefix) {
+  if (!buildPrefix) upToDate.clear();
   const CompilerKind compiler = project.settings->compiler;
   if (IsGccFamily(compiler)) return GenerateGccProject(project);
   const std::string stem = std::string(NamePrefix(buildPrefix)) + project.name;
@@ -65,6 +76,7 @@ void GenerateProjectFile(Project& project, bool buildPrefix) {
 }
 
 void GenerateWorkspaceFile(Workspace& workspace, bool buildPrefix) {
+  if (!buildPrefix) upToDate.clear();
   const CompilerKind compiler = workspace.settings.compiler;
   if (IsGccFamily(compiler)) return GenerateGccWorkspace(workspace);
   const std::string stem = std::string(NamePrefix(buildPrefix)) + workspace.name;

@@ -24,13 +24,14 @@ std::string_view ToolLines(CompilerKind compiler) {
 bool IsCompiled(const ProjectFile& file) { return file.kind == FileKind::C || file.kind == FileKind::Cpp; }
 
 // A value of one path for each compiled file, on lines of their own.
-template <typename PathOf>
-void WriteFileList(TextWriter& out, std::string_view name, const Project& project, PathOf pathOf) {
+template <typename WritePath>
+void WriteFileList(TextWriter& out, std::string_view name, const Project& project, WritePath writePath) {
   out << name << " = ";
   std::string_view separator = "";
   for (const ProjectFile* file : project.files) {
     if (!IsCompiled(*file)) continue;
-    out << separator << pathOf(*file);
+    out << separator;
+    writePath(*file);
     separator = " \\\n\t";
   }
   out << "\n\n";
@@ -59,10 +60,10 @@ void WriteTargetRule(TextWriter& out, const Project& project, const std::string&
 
 void WriteProjectMakeFile(TextWriter& out, const Project& project, const ProjectConfig& config) {
   const std::string target = GccTargetPath(project, config);
-  auto objectPath = [&](const ProjectFile& file) {
-    return config.platform + "/" + config.name + "/" + project.name + "/" + file.stem + ".o";
-  };
-  auto sourcePath = [&](const ProjectFile& file) { return CompiledPath(project, config, file); };
+  const std::string objects = config.platform + "/" + config.name + "/" + project.name + "/";
+  const std::string sources = CompiledDirectory(project, config) + "/";
+  auto writeObject = [&](const ProjectFile& file) { out << objects << file.stem << ".o"; };
+  auto writeSource = [&](const ProjectFile& file) { out << sources << file.path; };
 
   out << kHeading;
   out << "# Project : " << project.rootToProjDir << "\n";
@@ -76,8 +77,8 @@ void WriteProjectMakeFile(TextWriter& out, const Project& project, const Project
   out << "INCLUDE_PATH = ";
   for (const std::string& path : IncludePaths(project, config, project.usesQrex)) out << " -I\"" << path << "\"";
   out << "\n\n";
-  WriteFileList(out, "SRCS", project, sourcePath);
-  WriteFileList(out, "OBJS", project, objectPath);
+  WriteFileList(out, "SRCS", project, writeSource);
+  WriteFileList(out, "OBJS", project, writeObject);
   out << "# pull in dependency info for *existing* .o files\n"
          "#\n"
          "# $(OBJS:.o=.d) takes the value of $(OBJS), and replaces all occurrences of .o at the end of a name\n"
@@ -87,8 +88,10 @@ void WriteProjectMakeFile(TextWriter& out, const Project& project, const Project
   WriteTargetRule(out, project, target);
   for (const ProjectFile* file : project.files) {
     if (!IsCompiled(*file)) continue;
-    out << objectPath(*file) << ": " << sourcePath(*file) << "\n\t";
-    out << (file->kind == FileKind::Cpp ? "$(CXX) -c $(CXXFLAGS)" : "$(CC) -c $(CFLAGS)");
+    writeObject(*file);
+    out << ": ";
+    writeSource(*file);
+    out << "\n\t" << (file->kind == FileKind::Cpp ? "$(CXX) -c $(CXXFLAGS)" : "$(CC) -c $(CFLAGS)");
     out << " $(INCLUDE_PATH) -o $@ $<\n\n";
   }
   out << ".PHONY : clean\nclean:\n\trm -f " << target << " $(OBJS:.o=.d) $(OBJS)\n";

@@ -7,6 +7,7 @@
 
 #include "lex/scanner.h"
 #include "macro/python_library.h"
+#include "platform/console.h"
 #include "platform/dynamic_library.h"
 #include "text/exceptions.h"
 #include "text/files.h"
@@ -188,16 +189,17 @@ void WritePythonValue(TextWriter& writer, Object* object, const char* position, 
   }
 }
 
-// What Python's own file objects still hold goes out before the tool writes on.
-struct FlushAtEnd {
-  ~FlushAtEnd() { std::fflush(nullptr); }
+// The tool and Python's own file objects write to one output in turn.
+struct FlushBothWays {
+  FlushBothWays() { platform::FlushStdout(); }
+  ~FlushBothWays() { std::fflush(nullptr); }
 };
 
 }  // namespace
 
 std::string EvalPython(const std::string& expression, const char* position) {
   EnsurePython(position);
-  FlushAtEnd flush;
+  const FlushBothWays flush;
   const OwnedObject result(py.PyRun_StringFlags(expression.c_str(), kEvalInput, mainDict, mainDict, nullptr));
   if (!result) FailPython("Eval python error: ", position);
   MemoryTextWriter writer;
@@ -207,7 +209,7 @@ std::string EvalPython(const std::string& expression, const char* position) {
 
 void RunPython(const std::string& fileName, const std::string& code, const char* position) {
   EnsurePython(position);
-  FlushAtEnd flush;
+  const FlushBothWays flush;
   const OwnedObject compiled(py.Py_CompileStringFlags(code.c_str(), fileName.c_str(), kFileInput, nullptr));
   if (!compiled) FailPython("Python compilation error: ", position);
   if (!OwnedObject(py.PyEval_EvalCode(compiled.get(), mainDict, mainDict))) FailPython("RunPython error: ", position);

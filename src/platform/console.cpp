@@ -3,6 +3,7 @@
 #include <unistd.h>
 
 #include <cerrno>
+#include <chrono>
 
 namespace qrex::platform {
 
@@ -57,12 +58,39 @@ std::string WidenBytes(std::string_view text) {
 
 bool StdoutIsTerminal() { return isatty(STDOUT_FILENO) != 0; }
 
-void WriteStdout(std::string_view bytes) {
+namespace {
+
+using Clock = std::chrono::steady_clock;
+
+constexpr auto kMoment = std::chrono::milliseconds(50);
+constexpr size_t kMostBuffered = 64 << 10;
+bool isBuffered = false;
+std::string buffered;
+Clock::time_point lastWrite;
+
+void WriteAtOnce(std::string_view bytes) {
   while (!bytes.empty()) {
     const ssize_t written = write(STDOUT_FILENO, bytes.data(), bytes.size());
     if (written < 0 && errno != EINTR) return;
     if (written > 0) bytes.remove_prefix(static_cast<size_t>(written));
   }
+}
+
+}  // namespace
+
+void BufferStdout() { isBuffered = !StdoutIsTerminal(); }
+
+void FlushStdout() {
+  if (buffered.empty()) return;
+  WriteAtOnce(buffered);
+  buffered.clear();
+  lastWrite = Clock::now();
+}
+
+void WriteStdout(std::string_view bytes) {
+  if (!isBuffered) return WriteAtOnce(bytes);
+  buffered += bytes;
+  if (buffered.size() >= kMostBuffered || Clock::now() - lastWrite >= kMoment) FlushStdout();
 }
 
 }  // namespace qrex::platform

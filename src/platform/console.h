@@ -9,6 +9,10 @@ namespace qrex::platform {
 bool IsValidUtf8(std::string_view text);
 std::string WidenBytes(std::string_view text);  // each byte that is no part of valid UTF-8 as its own character
 bool StdoutIsTerminal();
-void WriteStdout(std::string_view bytes);  // at once, unbuffered; what can't be written is lost
+void WriteStdout(std::string_view bytes);  // at once, unless buffered; what can't be written is lost
+// From now on, lines that follow each other within moments go out together, unless a terminal shows them. Others that
+// write to the same output (commands, Python) come after FlushStdout, and so does the end of the process.
+void BufferStdout();
+void FlushStdout();
 
 }  // namespace qrex::platform

@@ -17,6 +17,7 @@
 #include <exception>
 #include <string_view>
 
+#include "platform/console.h"
 #include "platform/file_system.h"
 
 #if defined(__has_feature)
@@ -159,6 +160,7 @@ int RunCommand(const std::string& line) {
       command.compare(command.size() - kBatchEnd.size(), kBatchEnd.size(), kBatchEnd) == 0) {
     return RunBatchFile(command.substr(1, command.size() - 2));
   }
+  FlushStdout();
   const int status = std::system(command.c_str());
   if (status == -1) return -1;
   return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);

@@ -124,21 +124,35 @@ bool FullPathOf(const std::string& path, std::string& out) { return platform::Fu
 bool RealPathOf(const std::string& path, std::string& out) { return platform::RealPath(Checked(path), out); }
 bool ReadWholeFile(std::string& out, const std::string& path) { return platform::ReadFile(Checked(path), out); }
 
+namespace {
+
+// In place: CR LF and a lone CR become LF.
+void FoldLineEnds(std::string& text) {
+  const char* const end = text.data() + text.size();
+  auto findReturn = [end](const char* from) {
+    const void* found = std::memchr(from, '\r', static_cast<size_t>(end - from));
+    return found ? static_cast<const char*>(found) : end;
+  };
+  const char* from = findReturn(text.data());
+  char* to = text.data() + (from - text.data());
+  while (from < end) {
+    *to++ = '\n';
+    from += from + 1 < end && from[1] == '\n' ? 2 : 1;
+    const char* const next = findReturn(from);
+    const size_t length = static_cast<size_t>(next - from);
+    std::memmove(to, from, length);
+    to += length;
+    from = next;
+  }
+  text.resize(static_cast<size_t>(to - text.data()));
+}
+
+}  // namespace
+
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds) {
   std::string text;
   if (!ReadWholeFile(text, path)) return false;
-  if (foldLineEnds && text.find('\r') != std::string::npos) {
-    size_t to = 0;
-    for (size_t from = 0; from < text.size(); ++from) {
-      char c = text[from];
-      if (c == '\r') {
-        if (from + 1 < text.size() && text[from + 1] == '\n') ++from;
-        c = '\n';
-      }
-      text[to++] = c;
-    }
-    text.resize(to);
-  }
+  if (foldLineEnds) FoldLineEnds(text);
   out = std::move(text);
   return true;
 }

@@ -67,21 +67,25 @@ void GeneratedFile::Commit() {
   m_isSpilled = false;
 }
 
-int WriteIfChanged(MemoryTextWriter& writer, const std::string& path, ReadOnlyTarget readOnly) {
+FileUpdate UpdateFile(MemoryTextWriter& writer, const std::string& path, ReadOnlyTarget readOnly) {
   const std::string text = writer.TakeText(false);
   std::string old;
   if (LoadText(old, path, true) && old == text) {
     TraceWriter() << "Skipping " << path << "\n";
-    return 0;
+    return FileUpdate::Skipped;
   }
   TraceWriter() << "Writing " << path << "\n";
   try {
     ReplaceFile(path, WithCarriageReturns(text), readOnly);
   } catch (const FileException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
-    return 0;
+    return FileUpdate::Failed;
   }
-  return 1;
+  return FileUpdate::Written;
+}
+
+int WriteIfChanged(MemoryTextWriter& writer, const std::string& path) {
+  return UpdateFile(writer, path) == FileUpdate::Written ? 1 : 0;
 }
 
 void ChangeReadOnly(const std::string& path, bool readOnly) {

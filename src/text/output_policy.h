@@ -10,8 +10,11 @@
 namespace qrex {
 
 // Writes the text with CR LF line ends unless the file holds it already (line ends folded): "Skipping " or "Writing "
-// and the path. A file that cannot be written costs an "Error: " line. 1 when written, else 0.
-int WriteIfChanged(MemoryTextWriter& writer, const std::string& path, ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
+// and the path. A file that cannot be written costs an "Error: " line.
+enum class FileUpdate { Skipped, Written, Failed };
+FileUpdate UpdateFile(MemoryTextWriter& writer, const std::string& path,
+                      ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
+int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);  // the same: 1 when written, else 0
 
 // The text with each line feed as CR LF: how every generated file stands on disk.
 std::string WithCarriageReturns(std::string_view text);

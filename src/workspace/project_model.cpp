@@ -89,7 +89,7 @@ void Project::CollectFiles() {
   filesByName.clear();
   AddFoldersOf(rootFolder, folders);
 
-  std::unordered_map<std::string, ProjectFile*> sourcesByStem;
+  std::unordered_map<std::string_view, ProjectFile*> sourcesByStem;
   std::vector<ProjectFile*> creators, sources, assembler;  // creators: the last one met comes first
   ProjectFile* main = nullptr;
   files.clear();

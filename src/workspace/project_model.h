@@ -114,7 +114,7 @@ struct Project {
   bool filesCollected = false;
   std::vector<ProjectFolder*> folders;  // subfolders first, the root last
   std::vector<ProjectFile*> files;      // in build order
-  std::unordered_map<std::string, ProjectFile*> filesByName;
+  std::unordered_map<std::string_view, ProjectFile*> filesByName;
   std::map<std::string, std::unique_ptr<ProjectFile>> filesByPath;
   std::string mangledProjDir;
 };

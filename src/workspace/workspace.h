@@ -29,7 +29,7 @@ class Workspace {
   std::string name;
   std::string rootDir;
   std::string relativeDir;
-  std::unordered_map<std::string, ProjectFile*> fileMap;
+  std::unordered_map<std::string_view, ProjectFile*> fileMap;
 
  private:
   static constexpr int kMaxLoadDepth = 1000;
