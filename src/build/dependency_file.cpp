@@ -1,5 +1,8 @@
 #include "build/dependency_file.h"
 
+#include <algorithm>
+#include <vector>
+
 #include "text/files.h"
 #include "text/numbers.h"
 
@@ -41,18 +44,18 @@ class PayloadReader {
     return length;
   }
 
-  std::string String() {
+  std::string_view String() {  // lies in the payload
     std::string_view text;
     if (!ReadCompactString(m_rest, text)) throw DeserialisationException();
-    return std::string(text);
+    return text;
   }
 
   void Registry(DeclarationRegistry& registry) {
     registry.entries.clear();
     registry.dirty = false;
     for (uint64_t files = Length(); files > 0; --files) {
-      std::vector<std::string>& names = registry.entries[String()];
-      for (uint64_t count = Length(); count > 0; --count) names.push_back(String());
+      std::vector<std::string>& names = registry.entries[std::string(String())];
+      for (uint64_t count = Length(); count > 0; --count) names.emplace_back(String());
     }
   }
 
@@ -60,8 +63,10 @@ class PayloadReader {
   std::string_view m_rest;
 };
 
-ScannedFile* FindScanned(ProjectBuilder& builder, const std::string& path) {
-  ProjectFile* file = builder.FindFile(path);
+ScannedFile* FindScanned(ProjectBuilder& builder, std::string_view path) {
+  const auto known = builder.scannedByPath.find(path);
+  if (known != builder.scannedByPath.end()) return known->second.get();
+  ProjectFile* file = builder.FindFile(std::string(path));
   if (file) return &builder.GetScannedFile(*file);
   TraceWriter() << "*** Cannot find file " << path << "\n";
   return nullptr;
@@ -70,9 +75,13 @@ ScannedFile* FindScanned(ProjectBuilder& builder, const std::string& path) {
 }  // namespace
 
 std::string DependencyPayload(const ProjectBuilder& builder) {
+  std::vector<const ScannedFile*> files;
+  for (const auto& [path, file] : builder.scannedByPath) files.push_back(file.get());
+  std::sort(files.begin(), files.end(),
+            [](const ScannedFile* a, const ScannedFile* b) { return a->file.path < b->file.path; });
   std::string payload;
-  for (const auto& [path, file] : builder.scannedByPath) {
-    AppendCompactString(payload, path);
+  for (const ScannedFile* file : files) {
+    AppendCompactString(payload, file->file.path);
     AppendNumber(payload, static_cast<uint64_t>(file->translationTime), 8);
     AppendNumber(payload, file->imports.size(), 4);
     for (const ScannedFile* import : file->imports) AppendCompactString(payload, import->file.path);
@@ -86,7 +95,7 @@ std::string DependencyPayload(const ProjectBuilder& builder) {
 
 bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload) {
   PayloadReader reader(payload);
-  for (std::string path; !(path = reader.String()).empty();) {
+  for (std::string_view path; !(path = reader.String()).empty();) {
     ScannedFile* file = FindScanned(builder, path);
     if (!file) return false;
     file->translationTime = static_cast<int64_t>(reader.Number(8));

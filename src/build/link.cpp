@@ -118,10 +118,9 @@ std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   const bool isGcc = IsGccFamily(builder.settings.compiler);
   std::vector<std::string> inputs;
   for (const ScannedFile* file : builder.scanned) {
-    const FileKind kind = file->file.kind;
-    if (kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::Asm) {
+    if (HasObject(file->file)) {
       inputs.push_back(ObjectPath(builder, file->file));
-    } else if (kind == FileKind::Rc && !project.libraryIsStatic && !isGcc) {
+    } else if (file->file.kind == FileKind::Rc && !project.libraryIsStatic && !isGcc) {
       inputs.push_back(ResourceObjectPath(builder, file->file));
     }
   }

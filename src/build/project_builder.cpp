@@ -95,10 +95,33 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   }
   if (!settings.translateOnly) CreateDirectories(IntermediateDirectory(), true);
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
+  if (dependencyFileLoaded) ReadTimes();
   for (ScannedFile* file : scanned) {
     file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
     if (file->needsWriting && settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
+}
+
+// What the steps of an unchanged project ask for, at once: many files are waited for together.
+void ProjectBuilder::ReadTimes() {
+  std::vector<std::string> paths;
+  paths.reserve(3 * scanned.size());
+  for (const ScannedFile* file : scanned) {
+    paths.push_back(file->SourcePath());
+    paths.push_back(TranslatedPath(*file));
+  }
+  if (RunsTools()) {
+    for (const ScannedFile* file : scanned) {
+      if (HasObject(file->file)) paths.push_back(ObjectPath(*this, file->file));
+    }
+  }
+  const std::vector<int64_t> found = LastWriteTimes(paths);
+  size_t at = 0;
+  for (ScannedFile* file : scanned) {
+    file->sourceTime = found[at++];
+    file->targetTime = found[at++];
+  }
+  for (; at < paths.size(); ++at) m_objectTimes.emplace(std::move(paths[at]), found[at]);
 }
 
 bool ProjectBuilder::ProcessFiles(const ProjectFile* singleFile) {
@@ -113,16 +136,14 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   const FileKind kind = file.file.kind;
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
-  const bool runsTools = !project.exported && !settings.translateOnly;
   bool result = true;
   if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
   if (file.needsWriting && (kind == FileKind::H || (isWanted && !project.exported))) file.WriteGeneratedFile();
-  if (runsTools && isBuild && IsVisualCpp(settings.compiler) && settings.compiler != CompilerKind::vc6 &&
+  if (RunsTools() && isBuild && IsVisualCpp(settings.compiler) && settings.compiler != CompilerKind::vc6 &&
       kind == FileKind::Rc) {
     result = CompileResourceIfStale(file);
   }
-  const bool isSource = kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::Asm;
-  if (runsTools && isSource && isWanted) result = CompileIfStale(file);
+  if (RunsTools() && HasObject(file.file) && isWanted) result = CompileIfStale(file);
   if (kind == FileKind::Cpp && !file.translated) MarkRegistered(file);
   return result;
 }
@@ -134,7 +155,9 @@ bool ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
 
 bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
   const std::string object = ObjectPath(*this, file.file);
-  int64_t& objectTime = m_objectTimes[object] = times.LastWriteTime(object);
+  const auto [known, isNew] = m_objectTimes.try_emplace(object);
+  int64_t& objectTime = known->second;
+  if (isNew) objectTime = times.LastWriteTime(object);
   if (LatestTargetTime(*this, file) < objectTime) return true;
   file.WriteGeneratedFile();
   const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);

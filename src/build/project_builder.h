@@ -55,7 +55,7 @@ class ProjectBuilder : public TranslationHost {
   SymbolIndex m_symbols;  // ahead of the files, whose name spaces refer to it
 
  public:
-  std::map<std::string, std::unique_ptr<ScannedFile>> scannedByPath;
+  std::unordered_map<std::string_view, std::unique_ptr<ScannedFile>> scannedByPath;
   FileTimes times;
   bool dependencyFileLoaded = false;
   int64_t errorCount = 0;
@@ -64,6 +64,8 @@ class ProjectBuilder : public TranslationHost {
  private:
   void WriteHeading(std::string_view end) const;
   void PrepareFiles(const std::string& dependencyFile);
+  void ReadTimes();
+  bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   bool ProcessFiles(const ProjectFile* singleFile);
   bool ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
   bool CompileResourceIfStale(ScannedFile& file);
@@ -74,7 +76,7 @@ class ProjectBuilder : public TranslationHost {
 
   const std::string m_translationDirectory, m_intermediateDirectory;
   std::map<guid, std::string> m_guidOwners;
-  std::unordered_map<std::string, int64_t> m_objectTimes;  // of the objects that the compile steps have passed
+  std::unordered_map<std::string, int64_t> m_objectTimes;  // as the compile steps know them
   size_t m_nextFileIndex = 0;
 };
 

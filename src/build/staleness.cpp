@@ -7,7 +7,7 @@ namespace qrex {
 // The cache is set ahead of the imports, so that a cycle in a dependency file ends here.
 int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file) {
   if (file.latestSourceTime != 0) return file.latestSourceTime;
-  file.latestSourceTime = builder.times.LastWriteTime(file.SourcePath());
+  file.latestSourceTime = file.sourceTime != 0 ? file.sourceTime : builder.times.LastWriteTime(file.SourcePath());
   if (file.latestSourceTime == 0) return 0;
   for (ScannedFile* import : file.imports) {
     const int64_t time = LatestSourceTime(builder, *import);

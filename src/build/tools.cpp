@@ -37,8 +37,15 @@ std::string GccTargetPath(const Project& project, const ProjectConfig& config) {
   return path;
 }
 
+bool HasObject(const ProjectFile& file) {
+  return file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::Asm;
+}
+
 std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
-  return builder.IntermediateDirectory() + "/" + file.stem + (IsGccFamily(builder.settings.compiler) ? ".o" : ".obj");
+  const std::string_view extension = IsGccFamily(builder.settings.compiler) ? ".o" : ".obj";
+  std::string path;
+  path.reserve(builder.IntermediateDirectory().size() + 1 + file.stem.size() + extension.size());
+  return path.append(builder.IntermediateDirectory()).append("/").append(file.stem).append(extension);
 }
 
 std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {

@@ -20,6 +20,7 @@ std::string GccTargetPath(const Project& project, const ProjectConfig& config);
 std::string_view GccTargetExtension(TargetType type);  // "a", "so", "???" of a utility project; empty for programs
 
 // --- Of one build
+bool HasObject(const ProjectFile& file);  // C, C++ and assembler sources
 std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file);
 std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile& file);
 std::string TargetPath(const ProjectBuilder& builder);

@@ -2,6 +2,7 @@
 
 #include <unistd.h>
 
+#include <algorithm>
 #include <cerrno>
 #include <chrono>
 
@@ -31,12 +32,14 @@ size_t SequenceLength(std::string_view text) {
 }  // namespace
 
 bool IsValidUtf8(std::string_view text) {
-  while (!text.empty()) {
+  for (;;) {
+    const auto isBeyondAscii = [](char c) { return (c & 0x80) != 0; };
+    text.remove_prefix(static_cast<size_t>(std::find_if(text.begin(), text.end(), isBeyondAscii) - text.begin()));
+    if (text.empty()) return true;
     const size_t length = SequenceLength(text);
     if (length == 0) return false;
     text.remove_prefix(length);
   }
-  return true;
 }
 
 std::string WidenBytes(std::string_view text) {

@@ -1,7 +1,10 @@
 #include "text/files.h"
 
+#include <algorithm>
 #include <boost/crc.hpp>
 #include <cstring>
+#include <future>
+#include <thread>
 
 #include "platform/console.h"
 #include "platform/error.h"
@@ -108,6 +111,24 @@ int64_t FileTimes::LastWriteTime(const std::string& path) {
     return qrex::LastWriteTime(path);
   }
   return directory->WriteTimeOf(Checked(path).c_str() + nameBegin);
+}
+
+std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths) {
+  constexpr size_t kFewestOfThread = 500;
+  std::vector<int64_t> found(paths.size());
+  auto read = [&](size_t begin, size_t end) {
+    FileTimes times;
+    for (size_t i = begin; i < end; ++i) found[i] = times.LastWriteTime(paths[i]);
+  };
+  const size_t threads =
+      std::clamp<size_t>(paths.size() / kFewestOfThread, 1, std::max(1u, std::thread::hardware_concurrency()));
+  std::vector<std::future<void>> others;
+  for (size_t i = 1; i < threads; ++i) {
+    others.push_back(std::async(read, paths.size() * i / threads, paths.size() * (i + 1) / threads));
+  }
+  read(0, paths.size() / threads);
+  for (std::future<void>& other : others) other.get();
+  return found;
 }
 
 bool TouchFile(const std::string& path, bool create) {

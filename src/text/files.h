@@ -9,6 +9,7 @@
 #include <string_view>
 #include <unordered_map>
 #include <unordered_set>
+#include <vector>
 
 #include "text/exceptions.h"
 #include "text/streams.h"
@@ -46,6 +47,7 @@ class FileTimes {
   static constexpr size_t kMostDirectories = 64;  // each takes a descriptor
   std::unordered_map<std::string, std::unique_ptr<platform::DirectoryTimes>> m_directories;
 };
+std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths);  // of many files, by several threads
 bool TouchFile(const std::string& path, bool create);
 bool FullPathOf(const std::string& path, std::string& out);
 bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved

@@ -75,7 +75,9 @@ std::string PathJoin(std::string_view left, std::string_view right) {
     left = slash == std::string_view::npos ? std::string_view() : left.substr(0, slash);
     if (right.empty()) return std::string(left);
   }
-  return std::string(left).append("/").append(right);
+  std::string joined;
+  joined.reserve(left.size() + 1 + right.size());
+  return joined.append(left).append("/").append(right);
 }
 
 std::string PathJoin3(std::string_view a, std::string_view b, std::string_view c) {

@@ -76,9 +76,10 @@ class ScannedFile : public ImportHandler {
   std::string expandedText;
   SourceMap expansionMap;
   std::vector<ScannedFile*> imports;  // direct ones, in order
-  int64_t latestSourceTime = 0;       // caches, 0 while unknown
+  int64_t sourceTime = 0;             // of this file alone; these are caches, 0 while unknown
+  int64_t targetTime = 0;             // of the translated file
+  int64_t latestSourceTime = 0;       // the latest of these over the import closure
   int64_t latestTargetTime = 0;
-  int64_t targetTime = 0;       // of the translated file alone
   int64_t translationTime = 0;  // when the output was last brought up to date
   bool translated = false;
   bool hasDeclarations = false;

@@ -132,6 +132,23 @@ TEST_F(FilesTest, Operations) {
   EXPECT_THROW(FileExists("\xff"), StringConversionException);
 }
 
+TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
+  std::vector<std::string> paths;
+  std::vector<int64_t> times;
+  for (int i = 0; i < 1500; ++i) {
+    const std::string name = std::to_string(i % 100) + "/" + std::to_string(i / 100);
+    paths.push_back(i % 3 == 0 ? root + "/" + name : Make(name, ""));
+    if (i % 3 == 1)
+      std::filesystem::last_write_time(paths.back(),
+                                       std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
+  }
+  paths.push_back(root + "/1");
+  for (const std::string& path : paths) times.push_back(LastWriteTime(path));
+  EXPECT_EQ(times, LastWriteTimes(paths));
+  paths[700] = "\xff";
+  EXPECT_THROW(LastWriteTimes(paths), StringConversionException);
+}
+
 TEST_F(FilesTest, LineEnds) {
   const std::string path = Make("f", "a\r\rb\r\nc\n\r");
   std::string text;
