@@ -90,7 +90,8 @@ DirectoryTimes::~DirectoryTimes() {
 
 int64_t DirectoryTimes::WriteTimeOf(const char* name) const {
   struct stat status;
-  return fstatat(m_descriptor, name, &status, 0) == 0 ? FileTime(status.st_mtim) : 0;
+  const bool isFile = fstatat(m_descriptor, name, &status, 0) == 0 && !S_ISDIR(status.st_mode);
+  return isFile ? FileTime(status.st_mtim) : 0;
 }
 
 bool CanRead(const std::string& path) {
