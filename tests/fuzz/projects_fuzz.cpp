@@ -20,7 +20,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
       case 1: {
         fuzz::World world(CompilerKind::vc14, "{ }");
         ReplaceFile("tree/all.qrws", text);
-        WorkspaceParser parser(*world.workspace);
+        WorkspaceParser parser(*world.workspace, "tree/all.qrws");
         MpfwSourceFile* file = parser.LoadSourceFile("tree/all.qrws");
         if (!file) break;
         parser.SetInput(TextRange(std::string_view(file->expansion)));
