@@ -126,7 +126,7 @@ int32_t ScanLongToken(LexScanner& scanner) {
       }
       return ScanOperator(scanner);
     default:
-      throw LexScannerException("Bad token " + PrintedByte(scanner), scanner.begin);
+      throw LexScannerException(std::string("Bad token ") + c, scanner.begin);
   }
 }
 

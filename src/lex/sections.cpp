@@ -31,8 +31,10 @@ LexToken SkipToClose(LexScanner& scanner, int32_t open, int32_t close, const std
   }
 }
 
+// Of the line on which the first token ends: a comment may run over several.
 TextRange RestOfLine(LexScanner& scanner, const char* begin) {
   scanner.begin = begin;
+  NextToken(scanner, true);
   while (!scanner.AtEnd() && *scanner.begin != '\n' && *scanner.begin != '\r') ++scanner.begin;
   return {begin, scanner.begin};
 }

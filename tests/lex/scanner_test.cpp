@@ -46,9 +46,8 @@ TEST(ScannerTest, Operators) {
   EXPECT_EQ("31 *  31 *  31 *  47 ->  31 *  51 $$  50 $  49 ::  48 :", Tokens("***->*$$$:::"));
   EXPECT_EQ("36 ?  48 :  19 <<  35 =", Tokens("?: << ="));
   EXPECT_EQ("  !Invalid token ++= at 3", Tokens("++= "));
-  EXPECT_EQ("8 a  !Bad token '\\x7f' at 2", Tokens("a \x7f"));
-  EXPECT_EQ("  !Bad token '\\xc8' at 0", Tokens("\xc8"));
-  EXPECT_EQ("  !Bad token '\\0' at 0", Tokens(std::string(1, '\0')));
+  EXPECT_EQ("8 a  !Bad token \x7f at 2", Tokens("a \x7f"));
+  EXPECT_EQ("  !Bad token \xc8 at 0", Tokens("\xc8"));
 }
 
 TEST(ScannerTest, WordsAndComments) {
@@ -223,6 +222,8 @@ TEST(SectionsTest, Blocks) {
   EXPECT_EQ("0< x >;", block("  { x };"));
   EXPECT_EQ("0<x + y // c>\nz", block(" x + y // c\nz"));
   EXPECT_EQ("0<x>\r\nz", block("x\r\nz"));
+  EXPECT_EQ("0</* c\nd */ x>\nz", block(" /* c\nd */ x\nz"));
+  EXPECT_EQ("0<// c>\nz", block(" // c\nz"));
   EXPECT_EQ("0<  a\n  >\n", block("{\r\n  a\n  }\n"));
   EXPECT_EQ("4<a\n      b>\n", block("\n  {\n    a\n      b\n  }\n"));
   EXPECT_EQ("5<a\r\n\tb>", block("\r\n{\r\n\t a\r\n\tb\r\n}"));

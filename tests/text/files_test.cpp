@@ -12,7 +12,6 @@
 #include "text/output_policy.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
-#include "text/trace.h"
 
 namespace qrex {
 
@@ -101,6 +100,10 @@ TEST_F(FilesTest, Directories) {
   EXPECT_EQ(nullptr, FileOrDirIterator(root + "/none/*").Next());
   EXPECT_FALSE(FileExists(root + "/a"));
   EXPECT_EQ(0, LastWriteTime(root + "/a"));
+  FileTimes times;
+  EXPECT_EQ(0, times.LastWriteTime(root + "/a"));
+  EXPECT_EQ(LastWriteTime(root + "/a/z"), times.LastWriteTime(root + "/a/z"));
+  EXPECT_EQ(0, times.LastWriteTime(root + "/none/z"));
 }
 
 TEST_F(FilesTest, Operations) {
@@ -204,34 +207,6 @@ TEST_F(FilesTest, FileClass) {
   } catch (const FileException& exception) {
     EXPECT_EQ("File error (" + root + "/none) : The system cannot find the file specified.", ExceptionText(exception));
   }
-}
-
-TEST_F(FilesTest, OutputPolicy) {
-  struct Hook : TraceHook {
-    void OnTrace(std::string_view text) override { seen.append(text); }
-    std::string seen;
-  } hook;
-  SetTraceHook(&hook);
-  const std::string path = Make("f", "");
-  const auto write = [&](const char* text) {
-    MemoryTextWriter writer;
-    writer << text;
-    return WriteIfChanged(writer, path);
-  };
-  EXPECT_EQ(1, write("a\nb\n"));
-  EXPECT_EQ("a\r\nb\r\n", Content(path));
-  EXPECT_EQ(0, write("a\nb\n"));
-  SetReadOnly(path, true);
-  EXPECT_EQ(0, write("c"));
-  EXPECT_EQ("Writing " + path + "\nSkipping " + path + "\nWriting " + path + "\nError: File error (" + path +
-                ") : Access is denied.\n",
-            hook.seen);
-  EXPECT_EQ("a\r\nb\r\n", Content(path));
-  hook.seen.clear();
-  DeleteReporting(path);
-  DeleteReporting(path);
-  EXPECT_EQ("Deleting " + path + "\n", hook.seen);
-  SetTraceHook(nullptr);
 }
 
 TEST(ExceptionsTest, PrintedForms) {

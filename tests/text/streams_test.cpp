@@ -7,7 +7,6 @@
 #include <regex>
 
 #include "text/files.h"
-#include "text/scope_timer.h"
 #include "text/stream_adapters.h"
 #include "text/trace.h"
 
@@ -178,23 +177,6 @@ TEST_F(FileStreamTest, TraceLog) {
   EXPECT_EQ("ok", ::testing::internal::GetCapturedStdout());
   CloseTrace();
   SetTraceHook(nullptr);
-}
-
-TEST(ScopeTimerTest, Line) {
-  struct Hook : TraceHook {
-    void OnTrace(std::string_view text) override { seen.append(text); }
-    std::string seen;
-  } hook;
-  SetTraceHook(&hook);
-  {
-    ScopeTimer timer;
-    timer.Stop();
-    timer.Label() << "Loading x";
-  }
-  SetTraceHook(nullptr);
-  ASSERT_EQ(100u, hook.seen.size()) << hook.seen;
-  EXPECT_EQ("Loading x" + std::string(79, '.') + " ", hook.seen.substr(0, 89));
-  EXPECT_EQ(" ms\n", hook.seen.substr(96));
 }
 
 }  // namespace qrex
