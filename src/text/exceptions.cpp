@@ -16,6 +16,15 @@ std::string SystemErrorText(uint32_t code) {
   return text;
 }
 
+void ReportSystemError(const SystemException& exception) {
+  std::string text;
+  if (platform::ErrorSentence(exception.errorCode, text)) {
+    TraceWriter() << "ERROR : GetLastError() returned " << exception.errorCode << " : " << text << "\n";
+  } else {
+    TraceWriter() << "ERROR: FormatMessage() failed   GetLastError returned " << exception.errorCode << "\n";
+  }
+}
+
 SystemException::SystemException() : errorCode(platform::LastError()) {}
 
 void ExceptionBase::Write(TextWriter& writer) const { writer << message; }

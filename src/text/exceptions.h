@@ -39,6 +39,8 @@ class SystemException : public IException {
   uint32_t errorCode;
 };
 
+void ReportSystemError(const SystemException& exception);  // a line of the trace log with the code and its sentence
+
 class FileException : public SystemException {
  public:
   explicit FileException(std::string path) : path(std::move(path)) {}

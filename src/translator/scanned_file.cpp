@@ -190,7 +190,9 @@ bool ScannedFile::CopySource(const std::string& target) const {
   ChangeReadOnly(target, false);
   CreateDirectories(target, false);
   if (!CopyFile(SourcePath(), target, false)) {
+    const SystemException failure;
     TraceWriter() << "ERROR: Copy file " << SourcePath() << " to " << target << " failed\n";
+    ReportSystemError(failure);
     return false;
   }
   TouchFile(target, false);

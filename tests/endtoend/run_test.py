@@ -461,7 +461,11 @@ def test_what_is_in_the_way():
     holds(text, f'Error: File error ({TRANSLATED}a.h) : The system cannot find the path specified.\n',)
     os.remove('qrexsource')
     os.makedirs(TRANSLATED + 'c.h')
+    os.makedirs(TRANSLATED + 'n.txt')
     holds(run(status=1), f'Error: File error ({TRANSLATED}c.h) : ')
+    os.rmdir(TRANSLATED + 'c.h')
+    holds(run(), f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n'
+                 'ERROR : GetLastError() returned 5 : Access is denied.\n')
     shutil.rmtree('qrexsource')
     shutil.rmtree('out')
     os.makedirs('out/uinc/app/src/app.qrpj')

@@ -25,7 +25,6 @@ TEST_F(MessagesTest, Texts) {
   AssertFail({
       {"a\n\x01", "t(2) : Bad token \x01"},
       {"a\n\n\"abc", "t(3) : Met EOS within double quoted string after reading \"abc"},
-      {"'abc\n'", "t(1) : Met line feed within single quoted string after reading 'abc"},
       {"\n/*\n", "t(3) : Met EOS in middle of /* ... */ comment"},
       {"@else {}", "t(1) : @else with no matching @if directive"},
   });
@@ -45,7 +44,6 @@ TEST_F(MessagesTest, ImportsAndPaths) {
       {"@relativepath(\"a\")", "t(1) : Comma expected in @relativepath directive when read )"},
       {"@relativepath(\"a\",\n\"b\",)", "t(2) : ) expected  in @relativepath directive when read ,"},
       {"@relativepath(1,\"b\")", "t(1) : No implicit conversion from int64 to string\n    in @relativepath(1)"},
-      {"@relativepath(\"a\"", "t(1) : Met EOS while reading argument \"a\""},
   });
 }
 
@@ -85,9 +83,6 @@ TEST_F(MessagesTest, Definitions) {
       {"@def m(f(x)) = 1", "t(1) : Expected ) when read x"},
       {"@def m(x y) = 1",
        "t(1) : Comma or right parenthesis expected when read y\nwhile reading argument list for definition of macro m"},
-      {"@def m =\nx", "t(2) : Expected { when read x"},
-      {"@def m = {", "t(1) : Met EOS before closing }"},
-      {"@def m = {\nx", "t(2) : Met EOS while reading bracketted string"},
       {"@def m =\n{\nx", "t(3) : Met EOS before closing }"},
       {"\n@exportdef m = 1", "t(2) : No parent frame"},
   });
@@ -106,7 +101,6 @@ TEST_F(MessagesTest, Calls) {
       {"@def m(x,y) = x\nm 1", "t(2) : ( expected to begin argument list for macro m(x,y) when read 1"},
       {"@def m(x,y) = x\nm(a)", "t(2) : Insufficient arguments provided for macro m(x,y)"},
       {"@def m(x,y) = x\nm(a,b,\nc)", "t(2) : Too many arguments provided for macro m(x,y)"},
-      {"@def m(x) = x\nm(a", "t(2) : Met EOS while reading argument a"},
       {"@def m(x) = x\nm(`a", "t(2) : Met EOS while reading argument `a"},
       {"@def m(int x) = x\nm(\"s\")", "No conversion from string to int64\n    passing formal argument x to macro m"},
       {"@def m =\n{\n\n@fail(\"bad\")\n}\nm", "t(4) : bad\n    invoking macro m"},
@@ -123,7 +117,6 @@ TEST_F(MessagesTest, Calls) {
 TEST_F(MessagesTest, Conditions) {
   AssertFail({
       {"@if 1", "t(1) : ( expected when read 1"},
-      {"@if (true", "t(1) : Met EOS while reading bracketted section"},
       {"@if (true)", "t(1) : Expected { when read EOS"},
       {"@if (\n1)\n{}", "t(1) : No implicit conversion from int64 to bool\n    in @if(1)"},
       {"@if (true) {}\n@elseif (1) {}", "t(1) : No implicit conversion from int64 to bool\n    in @elseif(1)"},
@@ -172,9 +165,7 @@ TEST_F(MessagesTest, Expressions) {
       {"@def n = m@@1\n@def m1(x) = x\n@[n]",
        "t(3) : ( expected to begin argument list for macro m1(x) when read ]\n    in @[m1]"},
       {"@str x", "t(1) : Expected ( when read x"},
-      {"@str(x", "t(1) : Met EOS while reading bracketted string"},
       {"@unstr(x)", "t(1) : x isn't a quoted string\n    in @unstr(x)"},
-      {"@unstr()", "t(1) : Expected quoted string\n    in @unstr()"},
       {"@unstr \"a\"", "t(1) : ( expected when read \"a\""},
       {"@quote", "t(1) : Expected ( when read EOS"},
   });
