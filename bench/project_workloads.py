@@ -68,26 +68,45 @@ GN_TOOLCHAIN = """toolchain("gcc") {
 """
 
 
+# The compiler is given, since the search for it would take longer than all else; only sources are left to look at.
+CMAKE_HEAD = """cmake_minimum_required(VERSION 3.16)
+set(CMAKE_CXX_COMPILER g++)
+set(CMAKE_CXX_COMPILER_ID GNU)
+set(CMAKE_CXX_COMPILER_ID_RUN TRUE)
+set(CMAKE_CXX_COMPILER_FORCED TRUE)
+project(all CXX)
+add_compile_options(-g -Wall)
+"""
+
+GENERATED = ["make*", "all.*", "*.cbp", "projects.guids", "out", "x64"]
+
+
 def generation(root, projects, files):
-    """Project files for one compiler: `Qrex main.qrex`, `gn gen FOLDER`, `premake4 gmake` in root."""
+    """Project files for one compiler. In root, `Qrex main.qrex` writes GENERATED, and `premake4 gmake`, `gn gen gn_out` and
+    `cmake -B cmake_out` write a folder each."""
     sources = workspace(root, "gen", projects, files)
     targets = quoted([f"//tree/p{number}" for number in range(projects)], ", ")
     write(f"{root}/.gn", 'buildconfig = "//BUILDCONFIG.gn"\n')
     write(f"{root}/BUILDCONFIG.gn", 'set_default_toolchain("//:gcc")\n')
     write(f"{root}/BUILD.gn", GN_TOOLCHAIN + f'group("default") {{ deps = [ {targets} ] }}\n')
-    solution = ['solution "all"\nconfigurations { "Debug" }\n']
+    solution = ['solution "all"\nlocation "premake4_out"\nconfigurations { "Debug" }\n']
     for number, names in enumerate(sources):
         paths = [f"src/{name}" for name in names]
         dependency = f'  deps = [ "//tree/p{number - 1}" ]\n' if number else ""
         write(f"{root}/tree/p{number}/BUILD.gn",
               f'static_library("p{number}") {{\n  cflags = [ "-g", "-Wall" ]\n  include_dirs = [ ".", "src", ".." ]\n'
               f'  sources = [ {quoted(paths, ", ")} ]\n{dependency}}}\n')
+        write(f"{root}/tree/p{number}/CMakeLists.txt",
+              f'add_library(p{number} STATIC {" ".join(paths)})\ntarget_include_directories(p{number} PRIVATE . src ..)\n'
+              + (f"target_link_libraries(p{number} PRIVATE p{number - 1})\n" if number else ""))
         solution.append(
-            f'project "p{number}"\nkind "StaticLib"\nlanguage "C++"\nflags {{ "Symbols" }}\nbuildoptions {{ "-Wall" }}\n'
+            f'project "p{number}"\nlocation "premake4_out"\nkind "StaticLib"\nlanguage "C++"\nflags {{ "Symbols" }}\nbuildoptions {{ "-Wall" }}\n'
             f'includedirs {{ "tree", "tree/p{number}", "tree/p{number}/src" }}\n'
             f'files {{ {quoted([f"tree/p{number}/{path}" for path in paths], ", ")} }}\n'
             + (f'links {{ "p{number - 1}" }}\n' if number else ""))
     write(f"{root}/premake4.lua", "".join(solution))
+    write(f"{root}/CMakeLists.txt",
+          CMAKE_HEAD + "".join(f"add_subdirectory(tree/p{number})\n" for number in range(projects)))
 
 
 # --- Builds
@@ -102,15 +121,21 @@ object=${text##*-o \\"}
 
 
 def build(root, projects, files):
-    """A build whose tools cost nothing: `Qrex main.qrex` and `ninja` in root."""
+    """A build whose tools cost nothing: `Qrex main.qrex`, `ninja` and `make -rR` in root."""
     sources = workspace(root, "build", projects, files)
     for name in ("gcc-4", "ar"):
         write(f"{root}/tools/{name}", TOOL)
         os.chmod(f"{root}/tools/{name}", 0o755)
-    rules = ["rule make\n  command = : > $out\n"]
+    ninja, make, targets = ["rule make\n  command = : > $out\n"], [], []
     for number, names in enumerate(sources):
-        objects = [f"objects/p{number}/{name}.o" for name in names]
-        rules += [f"build {made}: make tree/p{number}/src/{name} | tree/p{number}/p{number}.h\n"
-                  for made, name in zip(objects, names)]
-        rules.append(f"build objects/p{number}.a: make {' '.join(objects)}\n")
-    write(f"{root}/build.ninja", "".join(rules))
+        objects = [f"p{number}/{name}.o" for name in names]
+        for made, name in zip(objects, names):
+            inputs = [f"tree/p{number}/src/{name}", f"tree/p{number}/p{number}.h"]
+            ninja.append(f"build ninja/{made}: make {inputs[0]} | {inputs[1]}\n")
+            make.append(f"make/{made}: {' '.join(inputs)}\n\t: > $@\n")
+        ninja.append(f"build ninja/p{number}.a: make {' '.join(f'ninja/{made}' for made in objects)}\n")
+        make.append(f"make/p{number}.a: {' '.join(f'make/{made}' for made in objects)}\n\t: > $@\n")
+        targets.append(f"make/p{number}.a")
+        os.makedirs(f"{root}/make/p{number}")
+    write(f"{root}/build.ninja", "".join(ninja))
+    write(f"{root}/Makefile", f"all: {' '.join(targets)}\n" + "".join(make))

@@ -2,6 +2,7 @@
 
 import os
 import random
+import re
 
 CONFIGURATION = """virtualTree = { "tree" }
 $EXPORT_LIB = "out/lib"
@@ -60,10 +61,15 @@ def workspace(root, files):
         write(f"{root}/tree/app/src/{name}", text)
 
 
-def is_translated(root, name, expected):
-    """Whether the generated text of a source of `app` begins with the content of the file `expected`."""
-    with open(f"{root}/qrexsource/x64/Debug/app/src/{name}", newline="") as file, open(expected, newline="") as wanted:
-        return file.read().replace("\r\n", "\n").startswith(wanted.read())
+def is_translated(root, name, expected, exactly=True):
+    """Whether the generated text of a source of `app` begins with the content of the file `expected`; unless exactly,
+    comments and blanks don't count."""
+    texts = []
+    for path in (f"{root}/qrexsource/x64/Debug/app/src/{name}", expected):
+        with open(path) as file:
+            text = file.read()
+        texts.append(text if exactly else re.sub(r"//.*|/\*.*?\*/|\s", "", text))
+    return texts[0].startswith(texts[1])
 
 
 # --- Plain C++
@@ -124,10 +130,10 @@ def plain_text(size, seed=1):
 
 
 def plain(root, size):
-    """Plain C++ without a macro: plain.cpp of the workspace."""
+    """Plain C++ without a macro: plain.cpp of the workspace. Gives its size."""
     text = plain_text(size)
     workspace(root, {"plain.cpp": text})
-    return {"size": len(text), "source": f"{root}/tree/app/src/plain.cpp"}
+    return len(text)
 
 
 # --- Macro calls
@@ -141,20 +147,18 @@ MACROS = {  # name: formals, body with the formals in braces
 }
 
 
-def qrex_definitions():
-    lines = []
-    for name, (formals, body) in MACROS.items():
-        pasted = {formal: formal for formal in formals}
-        text = body.replace("_{name}", "_@@{name}").format(**pasted)
-        lines.append(f"@def {name}{'(' + ', '.join(formals) + ')' if formals else ''} = {text}\n")
-    return "".join(lines)
+# As -C, except that blanks behind a comma are not part of the argument, which FIELD pastes.
+GPP_SYNTAX = ["-n", "-U", "", "", "(", r",\w", ")", "(", ")", "#", "", "-M", r"\n#\w", r"\n", " ", " ", r"\n", "", "",
+              "+c", "/*", "*/", "+c", "//", r"\n", "+s", '"', '"', "\\", "+s", "'", "'", "\\"]
 
 
-def m4_definitions():
+def definitions(line, reference, paste=""):
+    """A line for each macro. Its body has a reference for each formal, with `paste` before those that end a name."""
     lines = []
     for name, (formals, body) in MACROS.items():
-        numbers = {formal: f"${index + 1}" for index, formal in enumerate(formals)}
-        lines.append(f"define(`{name}', `{body.format(**numbers)}')dnl\n")
+        references = {formal: reference.format(name=formal, number=index + 1) for index, formal in enumerate(formals)}
+        lines.append(line.format(name=name, formals=f"({', '.join(formals)})" if formals else "",
+                                 body=body.replace("_{", f"_{paste}{{").format(**references)))
     return "".join(lines)
 
 
@@ -175,7 +179,8 @@ def calling_function(names, number):
 
 
 def macro_calls(root, size, calls):
-    """C++ with macro calls, padded with plain text: calls.cpp of the workspace, and calls.m4 for the peer."""
+    """C++ with macro calls, padded with plain text: calls.cpp of the workspace, and for the peers
+    calls.m4, calls.gpp and calls.c. Gives the size."""
     names = Names(2)
     classes = [calling_function(names, number) for number in range(calls // 5)]
     padding = plain_text(max(0, size - sum(map(len, classes))), 3).split("\n\n")
@@ -186,9 +191,11 @@ def macro_calls(root, size, calls):
         if index % step == 0 and index // step < len(padding):
             pieces.append(padding[index // step] + "\n\n")
     text = "".join(pieces)
-    workspace(root, {"calls.cpp": qrex_definitions() + text})
-    write(f"{root}/calls.m4", "changecom(`//')dnl\n" + m4_definitions() + text)
-    return {"size": len(text), "m4": f"{root}/calls.m4"}
+    workspace(root, {"calls.cpp": definitions("@def {name}{formals} = {body}\n", "{name}", "@@") + text})
+    write(f"{root}/calls.m4", "changecom(`//')dnl\n" + definitions("define(`{name}', `{body}')dnl\n", "${number}") + text)
+    write(f"{root}/calls.gpp", definitions("#define {name} {body}\n", "#{number}") + text)
+    write(f"{root}/calls.c", definitions("#define {name}{formals} {body}\n", "{name}", "##") + text)
+    return len(text)
 
 
 # --- Headers
@@ -203,12 +210,11 @@ def import_chain(root, count):
                                  f"inline int f{number}(int x) {{ return {used}; }}\n")
     files["main.cpp"] = f'@import "h{count - 1}.h"\nint main() {{ return f{count - 1}(0); }}\n'
     workspace(root, files)
-    return {"size": sum(map(len, files.values()))}
 
 
 def reflected_classes(root, count, per_header=10):
     """Chained headers of reflected classes, and the same fields as messages for protoc and as properties for moc, in as
-    many files (proto/) and in one (moc/classes.h)."""
+    many files (proto/) and in one (moc/classes.h). Gives the names in proto/."""
     headers = count // per_header
     files, moc = {}, ["#include <QObject>\n#include <QString>\n"]
     scalars = [("int32", "int32", "int"), ("float64", "double", "double"), ("bool", "bool", "bool"),
@@ -235,4 +241,4 @@ def reflected_classes(root, count, per_header=10):
     workspace(root, files)
     write(f"{root}/moc/classes.h", "".join(moc))
     os.makedirs(f"{root}/cpp", exist_ok=True)
-    return {"size": sum(map(len, files.values())), "proto": [f"p{header}.proto" for header in range(headers)]}
+    return [f"p{header}.proto" for header in range(headers)]
