@@ -82,8 +82,8 @@ GENERATED = ["make*", "all.*", "*.cbp", "projects.guids", "out", "x64"]
 
 
 def generation(root, projects, files):
-    """Project files for one compiler. In root, `Qrex main.qrex` writes GENERATED, and `premake4 gmake`, `gn gen gn_out` and
-    `cmake -B cmake_out` write a folder each."""
+    """Project files for one compiler. In root, `Qrex main.qrex` writes GENERATED, and `premake4 gmake`, `gn gen gn_out`
+    and `cmake -B cmake_out` write a folder each."""
     sources = workspace(root, "gen", projects, files)
     targets = quoted([f"//tree/p{number}" for number in range(projects)], ", ")
     write(f"{root}/.gn", 'buildconfig = "//BUILDCONFIG.gn"\n')
@@ -97,10 +97,12 @@ def generation(root, projects, files):
               f'static_library("p{number}") {{\n  cflags = [ "-g", "-Wall" ]\n  include_dirs = [ ".", "src", ".." ]\n'
               f'  sources = [ {quoted(paths, ", ")} ]\n{dependency}}}\n')
         write(f"{root}/tree/p{number}/CMakeLists.txt",
-              f'add_library(p{number} STATIC {" ".join(paths)})\ntarget_include_directories(p{number} PRIVATE . src ..)\n'
+              f'add_library(p{number} STATIC {" ".join(paths)})\n'
+              f'target_include_directories(p{number} PRIVATE . src ..)\n'
               + (f"target_link_libraries(p{number} PRIVATE p{number - 1})\n" if number else ""))
         solution.append(
-            f'project "p{number}"\nlocation "premake4_out"\nkind "StaticLib"\nlanguage "C++"\nflags {{ "Symbols" }}\nbuildoptions {{ "-Wall" }}\n'
+            f'project "p{number}"\nlocation "premake4_out"\n'
+            f'kind "StaticLib"\nlanguage "C++"\nflags {{ "Symbols" }}\nbuildoptions {{ "-Wall" }}\n'
             f'includedirs {{ "tree", "tree/p{number}", "tree/p{number}/src" }}\n'
             f'files {{ {quoted([f"tree/p{number}/{path}" for path in paths], ", ")} }}\n'
             + (f'links {{ "p{number - 1}" }}\n' if number else ""))

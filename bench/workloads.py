@@ -192,7 +192,8 @@ def macro_calls(root, size, calls):
             pieces.append(padding[index // step] + "\n\n")
     text = "".join(pieces)
     workspace(root, {"calls.cpp": definitions("@def {name}{formals} = {body}\n", "{name}", "@@") + text})
-    write(f"{root}/calls.m4", "changecom(`//')dnl\n" + definitions("define(`{name}', `{body}')dnl\n", "${number}") + text)
+    m4 = "changecom(`//')dnl\n" + definitions("define(`{name}', `{body}')dnl\n", "${number}")
+    write(f"{root}/calls.m4", m4 + text)
     write(f"{root}/calls.gpp", definitions("#define {name} {body}\n", "#{number}") + text)
     write(f"{root}/calls.c", definitions("#define {name}{formals} {body}\n", "{name}", "##") + text)
     return len(text)
@@ -228,7 +229,8 @@ def reflected_classes(root, count, per_header=10):
             pieces.append(f"$struct+ Class{number}\n{{\n" +
                           "".join(f"    ${ours} {name};\n" for ours, _, _, name in fields) + "};\n")
             proto.append(f"message Class{number} {{\n" +
-                         "".join(f"  {theirs} {name} = {i + 1};\n" for i, (_, theirs, _, name) in enumerate(fields)) + "}\n")
+                         "".join(f"  {theirs} {name} = {i + 1};\n" for i, (_, theirs, _, name) in enumerate(fields)) +
+                         "}\n")
             moc.append(f"class Class{number} : public QObject\n{{\n    Q_OBJECT\n" +
                        "".join(f"    Q_PROPERTY({qt} {name} MEMBER {name})\n" for _, _, qt, name in fields) +
                        "public:\n" + "".join(f"    {qt} {name};\n" for _, _, qt, name in fields) + "};\n")
