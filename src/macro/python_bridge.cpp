@@ -58,6 +58,7 @@ Object* WriteToStdOut(Object*, Object* arguments) {
   if (!py.PyArg_ParseTuple(arguments, "s", &text)) return nullptr;
   try {
     WriteToConsole(text);
+    platform::FlushStdout();  // what Python writes past its `sys.stdout` comes behind
   } catch (const IException& exception) {
     py.PyErr_SetString(*py.PyExc_IOError, ExceptionText(exception).c_str());
     return nullptr;
