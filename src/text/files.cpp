@@ -82,10 +82,17 @@ void CreateDirectories(const std::string& path, bool includeLast) {
   const size_t lastSlash = path.rfind('/');
   const std::string deepest = includeLast ? path : path.substr(0, lastSlash == std::string::npos ? 0 : lastSlash);
   if (deepest.empty() || platform::Stat(deepest, info)) return;
-  for (size_t slash = path.find('/', 1); slash != std::string::npos; slash = path.find('/', slash + 1)) {
-    platform::MakeDirectory(path.substr(0, slash));
+  // Mostly just the last one is missing: from there back to one that can be made, then forth.
+  size_t end = deepest.size();
+  while (!platform::MakeDirectory(deepest.substr(0, end))) {
+    const size_t slash = deepest.rfind('/', end - 1);
+    if (slash == std::string::npos || slash == 0) break;
+    end = slash;
   }
-  if (includeLast) platform::MakeDirectory(path);
+  while (end < deepest.size()) {
+    end = std::min(deepest.find('/', end + 1), deepest.size());
+    platform::MakeDirectory(deepest.substr(0, end));
+  }
 }
 
 bool SetReadOnly(const std::string& path, bool readOnly) {
