@@ -132,6 +132,17 @@ TEST_F(ProjectDetailsTest, OptionsOfTheNewFormat) {
               "</PrecompiledHeaderFile>\n");
 }
 
+// A utility project has no tool of any sort.
+TEST_F(ProjectDetailsTest, UtilityProjects) {
+  AddProject("app", "Utility Project", "+link { /NOLOGO } { }");
+  LoadAndGenerate(CompilerKind::vc6);
+  AssertHolds("app.dsp", "# ADD BSC32 /nologo\n\n!ELSEIF");
+  LoadAndGenerate(CompilerKind::vc8);
+  AssertHolds("app.vcproj", "\t\t\tManagedExtensions=\"0\"\n\t\t\t>\n\t\t</Configuration>\n");
+  LoadAndGenerate(CompilerKind::vc14);
+  AssertHolds("app.vcxproj", "'=='Release|x64'\">\n  </ItemDefinitionGroup>\n");
+}
+
 TEST_F(ProjectDetailsTest, IncludesOfAllRoots) {
   AddProject("app", "Application",
              R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj");

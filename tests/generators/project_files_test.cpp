@@ -1,6 +1,8 @@
-// Whole files of one workspace in all formats: an application, a static and a dynamic library, a utility project and a
-// prepackaged project, with folders three deep, excluded files and options of configurations and of single files.
+// The files of one workspace in all formats: an application, a static and a dynamic library, a utility project and a
+// prepackaged project, with folders three deep, excluded files and options of configurations and of single files. The
+// application and the workspace are kept as whole files; of the others stands in `others.txt` what is not as there.
 
+#include <map>
 #include <set>
 #include <vector>
 
@@ -21,10 +23,38 @@ struct Format {
   std::vector<std::pair<std::string, std::string>> differences;
 };
 
+// The lines of `text` that `other` lacks, each of them once and behind `mark`.
+std::string LinesBeyond(const std::string& text, const std::string& other, char mark) {
+  std::vector<std::string> lines;
+  SplitString(other, lines, "\n");
+  std::set<std::string> known(lines.begin(), lines.end());
+  lines.clear();
+  SplitString(text, lines, "\n");
+  std::string beyond;
+  for (const std::string& line : lines) {
+    if (known.insert(line).second) beyond += mark + line + "\n";
+  }
+  return beyond;
+}
+
 class ProjectFilesTest : public GenerateTest {
  protected:
+  // A translated form beside the plain one, any other file beside that of the application.
+  static std::string Differences(const std::string& name) {
+    const bool translated = name.starts_with("build_");
+    const std::string text = FoldedTextOf(name);
+    const std::string base = FoldedTextOf(translated ? name.substr(6) : "app" + name.substr(name.find('.')));
+    return name + "\n" + (translated ? LinesBeyond(base, text, '-') : "") + LinesBeyond(text, base, '+');
+  }
+  static std::string FoldedTextOf(const std::string& path) {
+    std::string text;
+    EXPECT_TRUE(LoadText(text, path, true)) << path;
+    return text;
+  }
+
   void AssertFormat(const Format& format) {
     const std::string family = IsGccFamily(format.compiler) ? "gcc" : "vc";
+    const std::filesystem::path folder = kData / "expected" / format.folder;
     std::filesystem::copy(kData / "workspace/tree", "tree", std::filesystem::copy_options::recursive);
     std::filesystem::copy(kData / "workspace" / family, family, std::filesystem::copy_options::recursive);
     settings.virtualTree = {"tree", family};
@@ -33,19 +63,25 @@ class ProjectFilesTest : public GenerateTest {
     Load("app/src/app.qrpj");
     Generate();
 
-    std::set<std::string> expected, generated;
-    for (const auto& entry : std::filesystem::directory_iterator(kData / "expected" / format.folder)) {
-      expected.insert(entry.path().filename());
-      std::string text;
-      ASSERT_TRUE(LoadText(text, entry.path(), true));
+    std::map<std::string, std::string> expected, generated;
+    for (const auto& entry : std::filesystem::directory_iterator(folder)) {
+      std::string& text = expected[entry.path().filename()] = FoldedTextOf(entry.path());
       for (const auto& [from, to] : format.differences) ReplaceAllInPlace(text, from, to);
-      EXPECT_EQ(WithCarriageReturns(text), TextOf(entry.path().filename())) << entry.path();
+      if (entry.path().filename() != "others.txt") text = WithCarriageReturns(text);
     }
+    std::set<std::string> names;
     for (const auto& entry : std::filesystem::directory_iterator(".")) {
       const std::string name = entry.path().filename();
-      if (entry.is_regular_file() && name.find("make") == std::string::npos) generated.insert(name);
+      if (entry.is_regular_file() && name.find("make") == std::string::npos) names.insert(name);
     }
-    EXPECT_EQ(expected, generated);
+    for (const std::string& name : names) {
+      if (expected.count(name)) {
+        generated[name] = TextOf(name);
+      } else {
+        generated["others.txt"] += Differences(name);
+      }
+    }
+    for (const auto& [name, text] : expected) EXPECT_EQ(text, generated[name]) << name;
   }
 };
 

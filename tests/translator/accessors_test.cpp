@@ -335,7 +335,7 @@ TEST_F(AccessorsTest, ForwardersOfAKeyProxy) {
 TEST_F(AccessorsTest, NestingIsBounded) {
   std::string type = "bool";
   for (int i = 0; i < 60; ++i) type = "DynArray<" + type + " >";
-  AssertErrors({{"$model M { " + type + " x; };", "(1) : error : Field x : type nested too deeply"}});
+  AssertErrors({{"$model M { " + type + " x; };", 1, "Field x : type nested too deeply"}});
 }
 
 }  // namespace

@@ -168,30 +168,26 @@ TEST_F(CachedFunctionsTest, PartsOfOtherForms) {
 }
 
 TEST_F(CachedFunctionsTest, Errors) {
-  const auto inClass = [](std::string text) { return "$struct S {\n$cache " + text; };
-  AssertErrors({
-      {inClass("<<fast>> int32 f() const { } };"), "(2) : error : Unrecognised qualifier << fast >> on $cache"},
-      {inClass("<<queue(8)>> int32 f() const { } };"), "(2) : error : Eviction queue index 8 must be between 0 and 7"},
-      {inClass("<<-queue(-1)>> int32 f() const { } };"),
-       "(2) : error : Eviction queue index -1 must be between 0 and 7"},
-      {inClass("<<queue 1>> int32 f() const { } };"), "(2) : error : Expected ( after queue when read 1"},
-      {inClass("int32 f()\n{ } };"), "(3) : error : $cache function must be declared const"},
-      {inClass("void f() const { } };"), "(2) : error : $cache function missing output type"},
-      {inClass("void f(int32 a) const { } };"), "(2) : error : $cache function missing output type"},
-      {inClass("void f(const int32& a) const { } };"), "(2) : error : $cache function missing output type"},
-      {inClass("int32 f() const with int32 i { } { } };"),
-       "(2) : error : 'with' only allowed on async $cache function"},
-      {inClass("<<async>> int32 f() const with int32 { } { } };"), "(2) : error : Error parsing input type and name"},
-      {inClass("<<async>> int32 f() const with int32 i() { } };"), "(2) : error : Error parsing input type and name"},
-      {inClass("<<async>> int32 f() const with 7 { } };"), "(2) : error : Error parsing input type and name"},
-      {inClass("<<async>> int32 f() const with int32 i = 1"),
-       "(2) : error : Met EOS while scanning forwards for semicolon"},
-      {inClass("<<async>> int32 f() const with int32 i = { } { } };"), "(2) : error : Expected ; after } when read {"},
-      {inClass("int32 f() const; };"), "(2) : error : Expected { after const when read ;"},
-      {inClass("int32 f() const { "), "(2) : error : Met EOS before read matching brace"},
-      {inClass("int32 f([int32 a]) const { } };"),
-       "(2) : error : '[' unexpected.  Polymorphic argument not allowed here"},
-  });
+  const std::vector<ErrorCase> cases = {
+      {"<<fast>> int32 f() const { } };", 2, "Unrecognised qualifier << fast >> on $cache"},
+      {"<<queue(8)>> int32 f() const { } };", 2, "Eviction queue index 8 must be between 0 and 7"},
+      {"<<-queue(-1)>> int32 f() const { } };", 2, "Eviction queue index -1 must be between 0 and 7"},
+      {"<<queue 1>> int32 f() const { } };", 2, "Expected ( after queue when read 1"},
+      {"int32 f()\n{ } };", 3, "$cache function must be declared const"},
+      {"void f() const { } };", 2, "$cache function missing output type"},
+      {"void f(int32 a) const { } };", 2, "$cache function missing output type"},
+      {"void f(const int32& a) const { } };", 2, "$cache function missing output type"},
+      {"int32 f() const with int32 i { } { } };", 2, "'with' only allowed on async $cache function"},
+      {"<<async>> int32 f() const with int32 { } { } };", 2, "Error parsing input type and name"},
+      {"<<async>> int32 f() const with int32 i() { } };", 2, "Error parsing input type and name"},
+      {"<<async>> int32 f() const with 7 { } };", 2, "Error parsing input type and name"},
+      {"<<async>> int32 f() const with int32 i = 1", 2, "Met EOS while scanning forwards for semicolon"},
+      {"<<async>> int32 f() const with int32 i = { } { } };", 2, "Expected ; after } when read {"},
+      {"int32 f() const; };", 2, "Expected { after const when read ;"},
+      {"int32 f() const { ", 2, "Met EOS before read matching brace"},
+      {"int32 f([int32 a]) const { } };", 2, "'[' unexpected.  Polymorphic argument not allowed here"},
+  };
+  AssertErrors(cases, "$struct S {\n$cache ");
 }
 
 }  // namespace

@@ -257,35 +257,35 @@ TEST_F(DepFieldsTest, BlocksOfClassWithRegistration) {
 }
 
 TEST_F(DepFieldsTest, Errors) {
-  const auto inClass = [](std::string text) { return "$struct S {\n" + text; };
-  AssertErrors({
-      {inClass("$indep ^ int32 a; };"), "(2) : error : ^ not permitted on $indep"},
-      {inClass("$dep <<async>> int32 a = 1; };"), "(2) : error : Unrecognised qualifier << async >> on $cache"},
-      {inClass("$indep 7; };"), "(2) : error : Syntax error"},
-      {inClass("$dep 7; };"), "(2) : error : Type expected when read 7"},
-      {inClass("$dep int32; };"), "(2) : error : Expected identifier after int32 when read ;"},
-      {inClass("$indep void a; };"), "(2) : error : void not permitted on $indep"},
-      {inClass("$int32 a; $dep int32 a = 1; };"), "(2) : error : Redefinition of field a"},
-      {inClass("$model { int32 a; } $indep int32 a; };"), "(2) : error : Redefinition of field a"},
-      {inClass("$dep int32 a\ncalc { } again { } };"),
-       "(3) : error : Expected 'evictable','evict','create','destroy','invalidate','visit' or 'calc' after } when read "
+  const std::vector<ErrorCase> cases = {
+      {"$indep ^ int32 a; };", 2, "^ not permitted on $indep"},
+      {"$dep <<async>> int32 a = 1; };", 2, "Unrecognised qualifier << async >> on $cache"},
+      {"$indep 7; };", 2, "Syntax error"},
+      {"$dep 7; };", 2, "Type expected when read 7"},
+      {"$dep int32; };", 2, "Expected identifier after int32 when read ;"},
+      {"$indep void a; };", 2, "void not permitted on $indep"},
+      {"$int32 a; $dep int32 a = 1; };", 2, "Redefinition of field a"},
+      {"$model { int32 a; } $indep int32 a; };", 2, "Redefinition of field a"},
+      {"$dep int32 a\ncalc { } again { } };", 3,
+       "Expected 'evictable','evict','create','destroy','invalidate','visit' or 'calc' after } when read "
        "again"},
-      {inClass("$indep int32 a = 1; };"), "(2) : error : Expected 'create','destroy' or 'visit' after a when read ="},
-      {inClass("$indep int32 a calc { } };"), "(2) : error : 'calc' can't be specified on $indep"},
-      {inClass("$indep int32 a invalidate { } };"), "(2) : error : 'invalidate' can't be specified on $indep"},
-      {inClass("$dep int32 a create { }\n; };"), "(3) : error : calc section not specified"},
-      {inClass("$dep int32 a = { } int b; };"), "(2) : error : Expected ; after } when read int"},
-      {inClass("$dep int32 a = 1 }"), "(2) : error : Met EOS while scanning forwards for semicolon"},
-      {inClass("$dep int32 a calc return 1; };"), "(2) : error : Expected { after calc when read return"},
-      {inClass("$dep int32 a calc { {"), "(2) : error : Met EOS before read matching brace"},
-      {inClass("$dep int32 a = { {"), "(2) : error : Met EOS before read matching brace"},
-      {inClass("$evict;"), "(2) : error : Expected { after evict when read ;"},
-      {inClass("$visit;"), "(2) : error : Expected { after visit when read ;"},
-  });
+      {"$indep int32 a = 1; };", 2, "Expected 'create','destroy' or 'visit' after a when read ="},
+      {"$indep int32 a calc { } };", 2, "'calc' can't be specified on $indep"},
+      {"$indep int32 a invalidate { } };", 2, "'invalidate' can't be specified on $indep"},
+      {"$dep int32 a create { }\n; };", 3, "calc section not specified"},
+      {"$dep int32 a = { } int b; };", 2, "Expected ; after } when read int"},
+      {"$dep int32 a = 1 }", 2, "Met EOS while scanning forwards for semicolon"},
+      {"$dep int32 a calc return 1; };", 2, "Expected { after calc when read return"},
+      {"$dep int32 a calc { {", 2, "Met EOS before read matching brace"},
+      {"$dep int32 a = { {", 2, "Met EOS before read matching brace"},
+      {"$evict;", 2, "Expected { after evict when read ;"},
+      {"$visit;", 2, "Expected { after visit when read ;"},
+  };
+  AssertErrors(cases, "$struct S {\n");
   for (const char* word : {"calc", "create", "destroy", "visit", "evictable", "evict", "invalidate"}) {
     const std::string section = std::string(word) + " { } ";
-    AssertErrors({{inClass("$dep int32 a " + section + section + "; };"),
-                   "(2) : error : '" + std::string(word) + "' already specified"}});
+    AssertErrors({{section + section + "; };", 2, "'" + std::string(word) + "' already specified"}},
+                 "$struct S {\n$dep int32 a ");
   }
 }
 

@@ -149,20 +149,20 @@ TEST_F(EnumsTest, ForwardDeclarations) {
 
 TEST_F(EnumsTest, Errors) {
   AssertErrors({
-      {"$struct S {\n$enum+ E { a }; };", "(2) : error : '+' modifier not permitted on nested enum"},
-      {"$struct E;\n$enum E;", "(2) : error : $enum E conflicts with previous declaration of $struct E"},
-      {"$enum class E;\n$enum E;", "(2) : error : $enum E had 'class' modifier in an earlier declaration"},
-      {"$enum E;\n$enum class E;", "(2) : error : $enum E didn't have 'class' modifier in an earlier declaration"},
-      {"$enum E { a };\n$enum E { a };", "(2) : error : Repeated definition of $enum E"},
-      {"$enum E <<\ncopy>> { a };", "(2) : error : Unrecognised qualifier << copy >> on $enum E"},
-      {"$enum E : 1", "(1) : error : Expected [ after : when read 1"},
-      {"$enum E\n( a );", "(2) : error : Expected { after E when read ("},
-      {"$enum E { a,\ndefault b };", "(2) : error : Default specifier only supported on $enum class"},
-      {"$enum class E { default a,\ndefault b };", "(2) : error : Repeated default specifier in $enum E"},
-      {"$enum E { - };", "(1) : error : Expected identifier after - when read }"},
-      {"$enum E { a b };", "(1) : error : Expected , or } after a when read b"},
-      {"$enum E { a", "(1) : error : Expected , or } after a when read EOS"},
-      {"$enum E { a }\nint x;", "(2) : error : ; expected after definition of $enum E when read int"},
+      {"$struct S {\n$enum+ E { a }; };", 2, "'+' modifier not permitted on nested enum"},
+      {"$struct E;\n$enum E;", 2, "$enum E conflicts with previous declaration of $struct E"},
+      {"$enum class E;\n$enum E;", 2, "$enum E had 'class' modifier in an earlier declaration"},
+      {"$enum E;\n$enum class E;", 2, "$enum E didn't have 'class' modifier in an earlier declaration"},
+      {"$enum E { a };\n$enum E { a };", 2, "Repeated definition of $enum E"},
+      {"$enum E <<\ncopy>> { a };", 2, "Unrecognised qualifier << copy >> on $enum E"},
+      {"$enum E : 1", 1, "Expected [ after : when read 1"},
+      {"$enum E\n( a );", 2, "Expected { after E when read ("},
+      {"$enum E { a,\ndefault b };", 2, "Default specifier only supported on $enum class"},
+      {"$enum class E { default a,\ndefault b };", 2, "Repeated default specifier in $enum E"},
+      {"$enum E { - };", 1, "Expected identifier after - when read }"},
+      {"$enum E { a b };", 1, "Expected , or } after a when read b"},
+      {"$enum E { a", 1, "Expected , or } after a when read EOS"},
+      {"$enum E { a }\nint x;", 2, "; expected after definition of $enum E when read int"},
   });
 }
 

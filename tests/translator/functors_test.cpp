@@ -170,18 +170,18 @@ TEST_F(FunctorsTest, Messages) {
 TEST_F(FunctorsTest, Errors) {
   const std::string functor = "$functor void F();\n";
   AssertErrors({
-      {"$functor <<\ncopy>> void F();", "(2) : error : Unrecognised qualifier << copy >> on $functor "},
-      {"$functor void F()\nconst;", "(2) : error : const specifier on global function prohibited"},
-      {"$functor void F([int32 a]);", "(1) : error : '[' unexpected.  Polymorphic argument not allowed here"},
-      {"$functor+ void F(int a);", "(1) : error : Can't accept platform dependent type: int"},
-      {functor + functor, "(2) : error : $functor F conflicts with previous declaration of $functor F"},
-      {"$functor void F()\nint x;", "(2) : error : ; expected after definition of $functor F when read int"},
-      {"$enum E { a };\n$makefunctor E e { }", "(2) : error : Expected functor identifier after E when read e"},
-      {functor + "$makefunctor F 7 { }", "(2) : error : Expected identifier after F when read 7"},
-      {functor + "$makefunctor F f(a) { }", "(2) : error : Expected , after ( when read )"},
-      {functor + "$makefunctor F f(a, b, c) { }", "(2) : error : Expected ) after , when read ,"},
-      {functor + "$makefunctor F f;", "(2) : error : Expected { after f when read ;"},
-      {functor + "$makefunctor F f { ", "(2) : error : Met EOS before read matching brace"},
+      {"$functor <<\ncopy>> void F();", 2, "Unrecognised qualifier << copy >> on $functor "},
+      {"$functor void F()\nconst;", 2, "const specifier on global function prohibited"},
+      {"$functor void F([int32 a]);", 1, "'[' unexpected.  Polymorphic argument not allowed here"},
+      {"$functor+ void F(int a);", 1, "Can't accept platform dependent type: int"},
+      {functor + functor, 2, "$functor F conflicts with previous declaration of $functor F"},
+      {"$functor void F()\nint x;", 2, "; expected after definition of $functor F when read int"},
+      {"$enum E { a };\n$makefunctor E e { }", 2, "Expected functor identifier after E when read e"},
+      {functor + "$makefunctor F 7 { }", 2, "Expected identifier after F when read 7"},
+      {functor + "$makefunctor F f(a) { }", 2, "Expected , after ( when read )"},
+      {functor + "$makefunctor F f(a, b, c) { }", 2, "Expected ) after , when read ,"},
+      {functor + "$makefunctor F f;", 2, "Expected { after f when read ;"},
+      {functor + "$makefunctor F f { ", 2, "Met EOS before read matching brace"},
   });
 }
 

@@ -140,10 +140,10 @@ app/api/p.h(7) : warning W1009 : $functor F not exported in public header of lib
 
 TEST_F(GlobalsTest, FunctionErrors) {
   AssertErrors({
-      {"$enum f;\n$function void f();", "(2) : error : $function f conflicts with previous declaration of $enum f"},
-      {"$function inline void f() { }\n$function void f() { }", "(2) : error : Repeated definition of $function f"},
-      {"$function void f()\nint x;", "(2) : error : Expected { after ) when read int"},
-      {"\n$function void f() {\n{ }", "(2) : error : Met EOF while scanning body of function f"},
+      {"$enum f;\n$function void f();", 2, "$function f conflicts with previous declaration of $enum f"},
+      {"$function inline void f() { }\n$function void f() { }", 2, "Repeated definition of $function f"},
+      {"$function void f()\nint x;", 2, "Expected { after ) when read int"},
+      {"\n$function void f() {\n{ }", 2, "Met EOF while scanning body of function f"},
   });
 }
 
@@ -172,12 +172,12 @@ TEST_F(GlobalsTest, Variables) {
 
 TEST_F(GlobalsTest, VariableErrors) {
   AssertErrors({
-      {"$var <<\nextern>> int32 v;", "(2) : error : Unrecognised qualifier << extern >> on $typedef"},
-      {"$var <<register -reflect>>\n7;", "(2) : error : Variable declaration expected when read 7"},
-      {"$var int32;", "(1) : error : Expected identifier after int32 when read ;"},
-      {"$var int32 v;\n$var int32 v;", "(2) : error : $var v conflicts with previous declaration of $var v"},
-      {"$var\nint32 v =\n1", "(2) : error : Missing semicolon after definition of variable v"},
-      {"$var+ int v;", "(1) : error : Can't accept platform dependent type: int"},
+      {"$var <<\nextern>> int32 v;", 2, "Unrecognised qualifier << extern >> on $typedef"},
+      {"$var <<register -reflect>>\n7;", 2, "Variable declaration expected when read 7"},
+      {"$var int32;", 1, "Expected identifier after int32 when read ;"},
+      {"$var int32 v;\n$var int32 v;", 2, "$var v conflicts with previous declaration of $var v"},
+      {"$var\nint32 v =\n1", 2, "Missing semicolon after definition of variable v"},
+      {"$var+ int v;", 1, "Can't accept platform dependent type: int"},
   });
   EXPECT_EQ("a.cpp(1) : error : @import of IObject.h required", ErrorOf("a.cpp", "$var int32 v;"));
   EXPECT_EQ("b.cpp(1) : error : @import of IObject.h required", ErrorOf("b.cpp", "$typedef int32 T;"));
@@ -214,10 +214,10 @@ TEST_F(GlobalsTest, TypedefMessagesAndErrors) {
   AssertMessages(
       {{"$typedef int32 : [ 1 ] T;", "t.h(1) : warning W1001 : Non-reflected $typedef T contains metadata\n"}});
   AssertErrors({
-      {"$typedef <<\ncopy>> int32 T;", "(2) : error : Unrecognised qualifier << copy >> on $typedef"},
-      {"$typedef\n7;", "(2) : error : Type expected when read 7"},
-      {"$struct T;\n$typedef int32 T;", "(2) : error : $typedef T conflicts with previous declaration of $struct T"},
-      {"$typedef\nint32 T\n", "(2) : error : Missing semicolon after typedef T"},
+      {"$typedef <<\ncopy>> int32 T;", 2, "Unrecognised qualifier << copy >> on $typedef"},
+      {"$typedef\n7;", 2, "Type expected when read 7"},
+      {"$struct T;\n$typedef int32 T;", 2, "$typedef T conflicts with previous declaration of $struct T"},
+      {"$typedef\nint32 T\n", 2, "Missing semicolon after typedef T"},
   });
 }
 

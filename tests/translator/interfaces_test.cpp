@@ -281,26 +281,25 @@ TEST_F(InterfacesTest, LadderOfDiamonds) {
     const std::string heading = ToString(i + 1) + " : A" + ToString(i) + ", B" + ToString(i) + " { }; ";
     text += "$interface A" + heading + "$interface B" + heading + "\n";
   }
-  AssertErrors({{text, "(14) : error : Too many base interfaces of $interface A13"}});
+  AssertErrors({{text, 14, "Too many base interfaces of $interface A13"}});
 }
 
 TEST_F(InterfacesTest, Faults) {
   AssertErrors({
-      {"$class C {\n$interface+ I { }; };", "(2) : error : '+' modifier not permitted on nested interface"},
-      {"$class C {\n$interface ipc I { }; };", "(2) : error : 'ipc' modifier not permitted on nested interface"},
-      {"$class C {\n$interface rmi I { }; };", "(2) : error : 'rmi' modifier not permitted on nested interface"},
-      {"$struct I { };\n$interface I { };",
-       "(2) : error : $interface I conflicts with previous declaration of $struct I"},
-      {"$interface I { };\n$interface I { };", "(2) : error : Repeated definition of $interface I"},
-      {"$interface I << abstract >> { };", "(1) : error : Unrecognised qualifier << abstract >> on $interface I"},
-      {"$interface I : { };", "(1) : error : Expected identifier after : when read {"},
-      {"$struct S { };\n$interface I : S { };", "(2) : error : Base interface name expected when read $struct S"},
-      {"$interface J { };\n$interface I : J J { };", "(2) : error : Expected , or { after J when read J"},
-      {"$interface I : I { };", "(1) : error : $interface I can't be its own base"},
-      {"$interface I [ ] { };", "(1) : error : Expected { after I when read ["},
-      {"$interface I {\nvoid f() }; ", "(2) : error : Expected ; after ) when read }"},
-      {"$interface I {\nvoid f(); }\nint", "(3) : error : ; expected after definition of $interface I when read int"},
-      {"$model M { xvector<M> m; };\n$interface I { M a; };", "(2) : error : Attribute a : $model M contains itself"},
+      {"$class C {\n$interface+ I { }; };", 2, "'+' modifier not permitted on nested interface"},
+      {"$class C {\n$interface ipc I { }; };", 2, "'ipc' modifier not permitted on nested interface"},
+      {"$class C {\n$interface rmi I { }; };", 2, "'rmi' modifier not permitted on nested interface"},
+      {"$struct I { };\n$interface I { };", 2, "$interface I conflicts with previous declaration of $struct I"},
+      {"$interface I { };\n$interface I { };", 2, "Repeated definition of $interface I"},
+      {"$interface I << abstract >> { };", 1, "Unrecognised qualifier << abstract >> on $interface I"},
+      {"$interface I : { };", 1, "Expected identifier after : when read {"},
+      {"$struct S { };\n$interface I : S { };", 2, "Base interface name expected when read $struct S"},
+      {"$interface J { };\n$interface I : J J { };", 2, "Expected , or { after J when read J"},
+      {"$interface I : I { };", 1, "$interface I can't be its own base"},
+      {"$interface I [ ] { };", 1, "Expected { after I when read ["},
+      {"$interface I {\nvoid f() }; ", 2, "Expected ; after ) when read }"},
+      {"$interface I {\nvoid f(); }\nint", 3, "; expected after definition of $interface I when read int"},
+      {"$model M { xvector<M> m; };\n$interface I { M a; };", 2, "Attribute a : $model M contains itself"},
   });
 }
 

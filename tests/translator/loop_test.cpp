@@ -90,21 +90,21 @@ TEST_F(LoopTest, InitAndUninit) {
 
 TEST_F(LoopTest, ErrorsOfDirectives) {
   AssertErrors({
-      {"\n}", "(2) : error : Can't match }"},
-      {"{ }\n}", "(2) : error : Can't match }"},
-      {"\n$bogus x;", "(2) : error : '$bogus' is not a valid directive"},
-      {"$schema x;", "(1) : error : '$schema' is not a valid directive"},
-      {"namespace 1 {", "(1) : error : Expected identifier after namespace when read 1"},
-      {"namespace a\n;", "(2) : error : Expected { after a when read ;"},
-      {"$enum e { x };\nnamespace e { }", "(2) : error : Can't open namespace e : $enum e is not a namespace"},
-      {"$new 1;", "(1) : error : Expected identifier after new when read 1"},
-      {"$new a::\n;", "(2) : error : Expected identifier after :: when read ;"},
-      {"$new a<", "(1) : error : Reached end of stream while scanning for matching >"},
-      {"$new a(", "(1) : error : Reached end of stream while scanning for matching )"},
-      {"$init x", "(1) : error : Expected { after init when read x"},
-      {"$uninit\n\nx", "(3) : error : Expected { after uninit when read x"},
-      {"$makefunctor nothing f { }", "(1) : error : Unrecognised identifier : nothing"},
-      {"$enum e { x }; $makefunctor\ne f { }", "(2) : error : Expected functor identifier after e when read f"},
+      {"\n}", 2, "Can't match }"},
+      {"{ }\n}", 2, "Can't match }"},
+      {"\n$bogus x;", 2, "'$bogus' is not a valid directive"},
+      {"$schema x;", 1, "'$schema' is not a valid directive"},
+      {"namespace 1 {", 1, "Expected identifier after namespace when read 1"},
+      {"namespace a\n;", 2, "Expected { after a when read ;"},
+      {"$enum e { x };\nnamespace e { }", 2, "Can't open namespace e : $enum e is not a namespace"},
+      {"$new 1;", 1, "Expected identifier after new when read 1"},
+      {"$new a::\n;", 2, "Expected identifier after :: when read ;"},
+      {"$new a<", 1, "Reached end of stream while scanning for matching >"},
+      {"$new a(", 1, "Reached end of stream while scanning for matching )"},
+      {"$init x", 1, "Expected { after init when read x"},
+      {"$uninit\n\nx", 3, "Expected { after uninit when read x"},
+      {"$makefunctor nothing f { }", 1, "Unrecognised identifier : nothing"},
+      {"$enum e { x }; $makefunctor\ne f { }", 2, "Expected functor identifier after e when read f"},
   });
 }
 

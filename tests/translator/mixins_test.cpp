@@ -165,23 +165,20 @@ TEST_F(MixinsTest, Implementing) {
 
 TEST_F(MixinsTest, Faults) {
   AssertErrors({
-      {"$class C { };\n$class K : mixin [ C ] { };", "(2) : error : $class C is not a $mixin or $model"},
-      {"$interface I { };\n$class K : mixin [\nI\n] { };", "(3) : error : $interface I is not a $class or $struct"},
-      {"$class K : mixin [ X ] { };", "(1) : error : Unrecognised identifier : X"},
-      {"$mixin M { };\n$class K : mixin [ M, M ] { };", "(2) : error : Expected identifier after M when read ,"},
-      {"$class K : mixin [ ? 5 ] { };", "(1) : error : Expected mixin name when read 5"},
-      {"$class K : mixin [ ? a::\n5 ] { };", "(2) : error : Expected identifier after a:: when read 5"},
-      {"$class K : mixin [\nmodel\n+ ] { };", "(2) : error : Expected { after 'model' when read +"},
-      {"$class K : mixin [ ?\nM<int", "(2) : error : Met EOS before read matching angled bracket"},
-      {"$class K { $implementing K; };", "(1) : error : $interface identifier expected when read $class K"},
-      {"$interface I { };\n$class K { $implementing\nadt I; };",
-       "(3) : error : $adt identifier expected when read $interface I"},
-      {"$interface I { };\n$class K { $implementing I -f; };", "(2) : error : - not supported"},
-      {"$interface I { void f(); };\n$class K { $implementing I { f\ng }; };",
-       "(3) : error : $interface I has no method named g"},
-      {"$interface I { };\n$class K { $implementing I { 5 }; };",
-       "(2) : error : Expected identifier after { when read 5"},
-      {"$interface I { };\n$class K { $implementing I { } x", "(2) : error : Expected , or ; after } when read x"},
+      {"$class C { };\n$class K : mixin [ C ] { };", 2, "$class C is not a $mixin or $model"},
+      {"$interface I { };\n$class K : mixin [\nI\n] { };", 3, "$interface I is not a $class or $struct"},
+      {"$class K : mixin [ X ] { };", 1, "Unrecognised identifier : X"},
+      {"$mixin M { };\n$class K : mixin [ M, M ] { };", 2, "Expected identifier after M when read ,"},
+      {"$class K : mixin [ ? 5 ] { };", 1, "Expected mixin name when read 5"},
+      {"$class K : mixin [ ? a::\n5 ] { };", 2, "Expected identifier after a:: when read 5"},
+      {"$class K : mixin [\nmodel\n+ ] { };", 2, "Expected { after 'model' when read +"},
+      {"$class K : mixin [ ?\nM<int", 2, "Met EOS before read matching angled bracket"},
+      {"$class K { $implementing K; };", 1, "$interface identifier expected when read $class K"},
+      {"$interface I { };\n$class K { $implementing\nadt I; };", 3, "$adt identifier expected when read $interface I"},
+      {"$interface I { };\n$class K { $implementing I -f; };", 2, "- not supported"},
+      {"$interface I { void f(); };\n$class K { $implementing I { f\ng }; };", 3, "$interface I has no method named g"},
+      {"$interface I { };\n$class K { $implementing I { 5 }; };", 2, "Expected identifier after { when read 5"},
+      {"$interface I { };\n$class K { $implementing I { } x", 2, "Expected , or ; after } when read x"},
   });
 }
 

@@ -409,83 +409,77 @@ $struct+ S << multiline >> isa I : model
 
 TEST_F(ModelsTest, FaultsOfTheBlock) {
   AssertErrors({
-      {"$model M {\nint32 a; $foo { } };", "(2) : error : $dropped or $schema expected when read $foo"},
-      {"$model M { int32 a;\n$dropped { } $evolve { } };", "(2) : error : $schema expected when read $evolve"},
-      {"$model M { int32 a; $dropped { }\n};", "(2) : error : Expected $schema after } when read }"},
-      {"$model M { int32 a; $schema { 1: +a }\n$foo { } };", "(2) : error : $evolve expected when read $foo"},
-      {"$model M { int32 a; $schema { 1: +a }\nint32 b; };", "(2) : error : Expected } after } when read int32"},
-      {"$model M { int32 a; $$() { }\nint32 b; };", "(2) : error : Expected } after } when read int32"},
-      {"$model M {\nint32 a;", "(2) : error : Met EOS before read matching brace for $model block"},
-      {"$model M {\nint32 a, b; };", "(2) : error : ; expected after field declaration when read ,"},
-      {"$model M { int32 a;\nstring8 a; };", "(2) : error : Repeated field name a"},
-      {"$model M { int32 a; $dropped {\nint32 a; } $schema { 1: +a } };", "(2) : error : Repeated field name a"},
-      {"$struct S { $int32 a; $model {\nint32 a; } };", "(2) : error : Repeated field name a"},
-      {"$model M {\nint32& a; };", "(2) : error : References not permitted within models"},
-      {"$model M {\nconst int32 a; };", "(2) : error : const or volatile qualifiers not permitted within models"},
-      {"$model M { int32 a;\nexplicit M(int32 a) { } };", "(2) : error : Expected $$ after explicit when read M"},
-      {"$model M { int32 a;\n$$(int32 b)", "(2) : error : Met EOS while scanning for '{'"},
-      {"$model M { }\n$model N { };", "(2) : error : ; expected after definition of $model M when read $"},
-      {"$model M { int32 a;\nM b; };", "(2) : error : Field b : $model M contains itself"},
-      {"$model M;\n$model N { M m[]; };\n$model M { xmap<int32, N> n; };",
-       "(3) : error : Field n : $model M contains itself"},
+      {"$model M {\nint32 a; $foo { } };", 2, "$dropped or $schema expected when read $foo"},
+      {"$model M { int32 a;\n$dropped { } $evolve { } };", 2, "$schema expected when read $evolve"},
+      {"$model M { int32 a; $dropped { }\n};", 2, "Expected $schema after } when read }"},
+      {"$model M { int32 a; $schema { 1: +a }\n$foo { } };", 2, "$evolve expected when read $foo"},
+      {"$model M { int32 a; $schema { 1: +a }\nint32 b; };", 2, "Expected } after } when read int32"},
+      {"$model M { int32 a; $$() { }\nint32 b; };", 2, "Expected } after } when read int32"},
+      {"$model M {\nint32 a;", 2, "Met EOS before read matching brace for $model block"},
+      {"$model M {\nint32 a, b; };", 2, "; expected after field declaration when read ,"},
+      {"$model M { int32 a;\nstring8 a; };", 2, "Repeated field name a"},
+      {"$model M { int32 a; $dropped {\nint32 a; } $schema { 1: +a } };", 2, "Repeated field name a"},
+      {"$struct S { $int32 a; $model {\nint32 a; } };", 2, "Repeated field name a"},
+      {"$model M {\nint32& a; };", 2, "References not permitted within models"},
+      {"$model M {\nconst int32 a; };", 2, "const or volatile qualifiers not permitted within models"},
+      {"$model M { int32 a;\nexplicit M(int32 a) { } };", 2, "Expected $$ after explicit when read M"},
+      {"$model M { int32 a;\n$$(int32 b)", 2, "Met EOS while scanning for '{'"},
+      {"$model M { }\n$model N { };", 2, "; expected after definition of $model M when read $"},
+      {"$model M { int32 a;\nM b; };", 2, "Field b : $model M contains itself"},
+      {"$model M;\n$model N { M m[]; };\n$model M { xmap<int32, N> n; };", 3, "Field n : $model M contains itself"},
   });
   // A vector of its own kind is no part of a model's path.
   EXPECT_NE(TranslateHeader("$model M { xvector<M> children; };").header.find("CreateIntochildren"), std::string::npos);
 }
 
 TEST_F(ModelsTest, FaultsOfTheSchema) {
-  std::vector<MessageCase> cases = {
-      {"a: +a", "(1) : error : Release number expected when read a"},
-      {"1: +a\n1: +b", "(2) : error : Unexpected release number 1 (must strictly increase)"},
-      {"3000000000: +a", "(1) : error : Unexpected release number -1294967296 (must strictly increase)"},
-      {"1 +a", "(1) : error : Expected : after 1 when read +"},
-      {"1: +a\n2:", "(2) : error : No schema changes specified"},
-      {"1: +5", "(1) : error : Expected field identifier after + when read 5"},
-      {"1: -5", "(1) : error : Expected field identifier after - when read 5"},
-      {"1: +z", "(1) : error : Field z not declared in the model"},
-      {"1: +a\n2: +a", "(2) : error : Field a already added in the schema"},
-      {"1: -d", "(1) : error : Field d can't be dropped from the schema until it has been added"},
-      {"1: +a +d\n2: -a", "(2) : error : Field a not declared as dropped"},
-      {"1: +a +d\n2: -z", "(2) : error : Field z not declared as dropped"},
-      {"1: +a +d\n2: -d\n3: -d", "(3) : error : Field d already dropped in the schema"},
-      {"1: +a +d\n2: +b -d",
-       "(2) : error : Syntax error: unexpected '-' : note that dropped fields must appear before added fields within a "
+  const std::vector<ErrorCase> cases = {
+      {"a: +a", 1, "Release number expected when read a"},
+      {"1: +a\n1: +b", 2, "Unexpected release number 1 (must strictly increase)"},
+      {"3000000000: +a", 1, "Unexpected release number -1294967296 (must strictly increase)"},
+      {"1 +a", 1, "Expected : after 1 when read +"},
+      {"1: +a\n2:", 2, "No schema changes specified"},
+      {"1: +5", 1, "Expected field identifier after + when read 5"},
+      {"1: -5", 1, "Expected field identifier after - when read 5"},
+      {"1: +z", 1, "Field z not declared in the model"},
+      {"1: +a\n2: +a", 2, "Field a already added in the schema"},
+      {"1: -d", 1, "Field d can't be dropped from the schema until it has been added"},
+      {"1: +a +d\n2: -a", 2, "Field a not declared as dropped"},
+      {"1: +a +d\n2: -z", 2, "Field z not declared as dropped"},
+      {"1: +a +d\n2: -d\n3: -d", 3, "Field d already dropped in the schema"},
+      {"1: +a +d\n2: +b -d", 2,
+       "Syntax error: unexpected '-' : note that dropped fields must appear before added fields within a "
        "schema"},
-      {"1: +a +b\n", "(2) : error : Field d never added in a schema"},
-      {"1: +a +d\n2: -d", "(2) : error : Field b never added in a schema"},
-      {"1: +a +b +d\n", "(2) : error : Field d never dropped in a schema"},
+      {"1: +a +b\n", 2, "Field d never added in a schema"},
+      {"1: +a +d\n2: -d", 2, "Field b never added in a schema"},
+      {"1: +a +b +d\n", 2, "Field d never dropped in a schema"},
   };
-  for (MessageCase& schema : cases) {
-    schema.text = "$model M { int32 a; int32 b; $dropped { int32 d; } $schema { " + schema.text + "} };";
-  }
-  cases.push_back(
-      {"$model M { int32 a; $schema {\n1: +a", "(2) : error : Met EOS before read matching brace for $schema block"});
-  AssertErrors(cases);
+  AssertErrors(cases, "$model M { int32 a; int32 b; $dropped { int32 d; } $schema { ", "} };");
+  AssertErrors({{"$model M { int32 a; $schema {\n1: +a", 2, "Met EOS before read matching brace for $schema block"}});
 }
 
 TEST_F(ModelsTest, FaultsOfTheEvolution) {
-  std::vector<MessageCase> cases = {
-      {"5 { }", "(1) : error : Expected field identifier after { when read 5"},
-      {"z { }", "(1) : error : Field z not declared in the model"},
-      {"a { }", "(1) : error : Can't initialise field a that appeared in the first schema"},
-      {"c { c = 1; }\nc { c = 2; }", "(2) : error : Repeated initialisation code for field c"},
-      {"c(5) { }", "(1) : error : Expected identifier after ( when read 5"},
-      {"c(z) { }", "(1) : error : Field z not declared in the model"},
-      {"g(c) { }", "(1) : error : Field c not available in the schema just before g was added"},
-      {"c(e) { }", "(1) : error : Field e not available in the schema just before c was added"},
-      {"c(b;\na) { }", "(1) : error : Syntax error in dependency arg list : ;"},
-      {"c 5", "(1) : error : Expected { after c when read 5"},
-      {"e { e = 1; }\n", "(2) : error : Redundant initialisation of field e"},
+  const std::vector<ErrorCase> cases = {
+      {"5 { }", 1, "Expected field identifier after { when read 5"},
+      {"z { }", 1, "Field z not declared in the model"},
+      {"a { }", 1, "Can't initialise field a that appeared in the first schema"},
+      {"c { c = 1; }\nc { c = 2; }", 2, "Repeated initialisation code for field c"},
+      {"c(5) { }", 1, "Expected identifier after ( when read 5"},
+      {"c(z) { }", 1, "Field z not declared in the model"},
+      {"g(c) { }", 1, "Field c not available in the schema just before g was added"},
+      {"c(e) { }", 1, "Field e not available in the schema just before c was added"},
+      {"c(b;\na) { }", 1, "Syntax error in dependency arg list : ;"},
+      {"c 5", 1, "Expected { after c when read 5"},
+      {"e { e = 1; }\n", 2, "Redundant initialisation of field e"},
   };
   const std::string model =
       "$model M { int32 a; int32 c; int32 g; $dropped { int32 b; int32 e; } "
       "$schema { 1: +a +b 3: +g +e 4: -e 5: -b +c } $evolve { ";
-  for (MessageCase& entry : cases) entry.text = model + entry.text + "} };";
-  cases.push_back({model + "\nc(b,", "(2) : error : Met EOS in middle of arg list"});
-  for (const char* rest : {"\nc { c = 1;", "\nc { c = 1; }"}) {
-    cases.push_back({model + rest, "(2) : error : Met EOS before read matching brace for $evolve block"});
-  }
-  AssertErrors(cases);
+  AssertErrors(cases, model, "} };");
+  AssertErrors({{"\nc(b,", 2, "Met EOS in middle of arg list"},
+                {"\nc { c = 1;", 2, "Met EOS before read matching brace for $evolve block"},
+                {"\nc { c = 1; }", 2, "Met EOS before read matching brace for $evolve block"}},
+               model);
   // An argument that goes in the very release of the field is at hand, and empty code is none.
   EXPECT_NE(TranslateHeader(model + "c(b) { } c(b) { c = b; } } };").header.find("struct M"), std::string::npos);
 }

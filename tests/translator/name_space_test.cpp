@@ -30,16 +30,16 @@ TEST_F(LookUp, CurrentNameSpaceThenRoot) {
     MakeWorld(TargetType::Application);
   }
   AssertErrors({
-      {names + "namespace a { namespace b { $type A; } }", "(2) : error : Unrecognised identifier : A"},
-      {names + "$type A;", "(2) : error : Unrecognised identifier : A"},
-      {names + "namespace a { $type ::A; }", "(2) : error : Unrecognised identifier : A"},
-      {names + "$type a::R;", "(2) : error : Unrecognised identifier : R"},
-      {names + "$type R::x;", "(2) : error : :: not expected here : $struct R is not a namespace"},
-      {names + "$type a::\n1;", "(3) : error : Expected identifier after :: when read 1"},
-      {names + "$struct K isa R { };", "(2) : error : $interface identifier expected when read $struct R"},
-      {names + "$struct K isa a::A::x { };", "(2) : error : :: not expected here : $struct a::A is not a namespace"},
-      {names + "$struct K isa a::none { };", "(2) : error : Unrecognised identifier : none"},
-      {names + "$struct K isa ::a::\n{ };", "(3) : error : Expected identifier after :: when read {"},
+      {names + "namespace a { namespace b { $type A; } }", 2, "Unrecognised identifier : A"},
+      {names + "$type A;", 2, "Unrecognised identifier : A"},
+      {names + "namespace a { $type ::A; }", 2, "Unrecognised identifier : A"},
+      {names + "$type a::R;", 2, "Unrecognised identifier : R"},
+      {names + "$type R::x;", 2, ":: not expected here : $struct R is not a namespace"},
+      {names + "$type a::\n1;", 3, "Expected identifier after :: when read 1"},
+      {names + "$struct K isa R { };", 2, "$interface identifier expected when read $struct R"},
+      {names + "$struct K isa a::A::x { };", 2, ":: not expected here : $struct a::A is not a namespace"},
+      {names + "$struct K isa a::none { };", 2, "Unrecognised identifier : none"},
+      {names + "$struct K isa ::a::\n{ };", 3, "Expected identifier after :: when read {"},
   });
 }
 
@@ -93,15 +93,13 @@ TEST_F(LookUp, Ambiguity) {
 TEST_F(NameSpaceTest, Conflicts) {
   const std::array<std::string, 3> cases[] = {
       // the text, the error and where it sends the reader
-      {"\n$struct A;\n$class A;", "(3) : error : $class A conflicts with previous declaration of $struct A",
+      {"\n$struct A;\n$class A;", 3, "$class A conflicts with previous declaration of $struct A",
        "(2) : see declaration of $struct A"},
-      {"namespace n { $enum+ E { x };\n$struct E { }; }",
-       "(2) : error : $struct E conflicts with previous declaration of $enum+ n::E",
-       "(1) : see declaration of $enum+ n::E"},
-      {"\nnamespace n { }\n$enum n { x };", "(3) : error : $enum n conflicts with previous declaration of $namespace n",
+      {"namespace n { $enum+ E { x };\n$struct E { }; }", 2,
+       "$struct E conflicts with previous declaration of $enum+ n::E", "(1) : see declaration of $enum+ n::E"},
+      {"\nnamespace n { }\n$enum n { x };", 3, "$enum n conflicts with previous declaration of $namespace n",
        "(2) : see declaration of $namespace n"},
-      {"$struct B { };\n$struct B { };", "(2) : error : Repeated definition of $struct B",
-       "(1) : see declaration of $struct B"},
+      {"$struct B { };\n$struct B { };", 2, "Repeated definition of $struct B", "(1) : see declaration of $struct B"},
   };
   for (const auto& [text, error, place] : cases) {
     MakeWorld(TargetType::Application);
@@ -114,10 +112,10 @@ TEST_F(NameSpaceTest, Conflicts) {
 
 TEST_F(NameSpaceTest, Modifiers) {
   AssertErrors({
-      {"$struct++ A;", "(1) : error : '+' modifier repeated"},
-      {"$type + + int32;", "(1) : error : '+' modifier repeated"},
-      {"$type <<\nreflekt>> int32;", "(2) : error : Unrecognised qualifier << reflekt >> on $type"},
-      {"$function <<-extern>> void f() { }", "(1) : error : Unrecognised qualifier << extern >> on $function "},
+      {"$struct++ A;", 1, "'+' modifier repeated"},
+      {"$type + + int32;", 1, "'+' modifier repeated"},
+      {"$type <<\nreflekt>> int32;", 2, "Unrecognised qualifier << reflekt >> on $type"},
+      {"$function <<-extern>> void f() { }", 1, "Unrecognised qualifier << extern >> on $function "},
   });
 }
 
@@ -189,13 +187,13 @@ TEST_F(NameSpaceTest, WarningsPerFile) {
 
 TEST_F(NameSpaceTest, ErrorsOfWarningDirectives) {
   AssertErrors({
-      {"$warning push;", "(1) : error : Expected ( after warning when read push"},
-      {"$warning(\nsuppress: 1000)", "(2) : error : Expected push/pop/enable/disable after ( when read suppress"},
-      {"$warning(push pop)", "(1) : error : Expected ; or ) after push when read pop"},
-      {"$warning(pop)", "(1) : error : $warning pop without matching push"},
-      {"$warning(disable 1000)", "(1) : error : Expected : after disable when read 1000"},
-      {"$warning(disable: 999)", "(1) : error : Invalid warning code : 999"},
-      {"$warning(enable: 1002 1018)", "(1) : error : Invalid warning code : 1018"},
+      {"$warning push;", 1, "Expected ( after warning when read push"},
+      {"$warning(\nsuppress: 1000)", 2, "Expected push/pop/enable/disable after ( when read suppress"},
+      {"$warning(push pop)", 1, "Expected ; or ) after push when read pop"},
+      {"$warning(pop)", 1, "$warning pop without matching push"},
+      {"$warning(disable 1000)", 1, "Expected : after disable when read 1000"},
+      {"$warning(disable: 999)", 1, "Invalid warning code : 999"},
+      {"$warning(enable: 1002 1018)", 1, "Invalid warning code : 1018"},
   });
 }
 

@@ -77,9 +77,9 @@ TEST_F(RecordsTest, TypeRegistrations) {
 TEST_F(RecordsTest, TypeErrors) {
   EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$type int32;"));
   AssertErrors({
-      {"$type\n1;", "(2) : error : Type expected when read 1"},
-      {"$type std::string;", "(1) : error : Unrecognised identifier : std"},
-      {"$type+ xvector<int8>\n x", "(2) : error : ; expected after $type vesk::xvector<vesk::int8> when read x"},
+      {"$type\n1;", 2, "Type expected when read 1"},
+      {"$type std::string;", 1, "Unrecognised identifier : std"},
+      {"$type+ xvector<int8>\n x", 2, "; expected after $type vesk::xvector<vesk::int8> when read x"},
   });
 }
 

@@ -170,18 +170,14 @@ TEST_F(RemoteTest, WithoutReflection) {
 }
 
 TEST_F(RemoteTest, Faults) {
-  std::vector<MessageCase> cases = {
-      {"void f(int32 a);", "[in] or [out] expected when read int32"},
-      {"void f([in] int32& a);", "in parameter a passed by reference"},
-      {"void f([inout] int32* a);", "out parameter a must be passed by reference"},
-      {"int32 f();", "Return type vesk::int32 invalid - must be void"},
-      {"int32 a;", "Attributes currently not supported on IPC interfaces"},
+  const std::vector<ErrorCase> cases = {
+      {"void f(int32 a);", 2, "[in] or [out] expected when read int32"},
+      {"void f([in] int32& a);", 2, "in parameter a passed by reference"},
+      {"void f([inout] int32* a);", 2, "out parameter a must be passed by reference"},
+      {"int32 f();", 2, "Return type vesk::int32 invalid - must be void"},
+      {"int32 a;", 2, "Attributes currently not supported on IPC interfaces"},
   };
-  for (auto& [member, message] : cases) {
-    member = "$interface ipc I {\n" + member + " };";
-    message = "(2) : error : " + message;
-  }
-  AssertErrors(cases);
+  AssertErrors(cases, "$interface ipc I {\n", " };");
 }
 
 }  // namespace

@@ -233,22 +233,27 @@ class TranslateTest : public ::testing::Test, public TraceHook {
   }
 
   // Tables of header texts and the error that each raises, or the messages that its translation prints, in a new world
-  // for each, of the kind that `app` has. The import of IObject.h stands on the first line of the text.
+  // for each, of the kind that `app` has. The import of IObject.h stands on the first line of the text. `before` and
+  // `after` stand around the text of each case.
+  struct ErrorCase {
+    std::string text;
+    int line;
+    std::string error;
+  };
   struct MessageCase {
     std::string text, message;
   };
-  void AssertErrors(const std::vector<MessageCase>& cases, const std::string& name = "t.h") {
-    for (const auto& [text, message] : cases) {
+  void AssertErrors(const std::vector<ErrorCase>& cases, const std::string& before = {},
+                    const std::string& after = {}) {
+    for (const auto& [text, line, error] : cases) {
       SCOPED_TRACE(text);
-      MakeWorld(app().targetType);
-      EXPECT_EQ(name + message, ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text));
+      EXPECT_EQ("t.h(" + ToString(line) + ") : error : " + error, ErrorInNewWorld("t.h", before + text + after));
     }
   }
   void AssertMessages(const std::vector<MessageCase>& cases, const std::string& name = "t.h") {
     for (const auto& [text, message] : cases) {
       SCOPED_TRACE(text);
-      MakeWorld(app().targetType);
-      const std::string error = ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
+      const std::string error = ErrorInNewWorld(name, text);
       EXPECT_EQ("no error", error.substr(0, 8)) << error;
       EXPECT_EQ(message, Messages());
     }
@@ -298,6 +303,10 @@ class TranslateTest : public ::testing::Test, public TraceHook {
   std::string trace;  // what was written to the trace log
 
  private:
+  std::string ErrorInNewWorld(const std::string& name, const std::string& text) {
+    MakeWorld(app().targetType);
+    return ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
+  }
   std::string WithShortPaths(std::string text) const {
     ReplaceAllInPlace(text, m_root + "/", "");
     ReplaceAllInPlace(text, "app/src/", "");

@@ -370,28 +370,26 @@ TEST_F(VariantsTest, Messages) {
 
 TEST_F(VariantsTest, Errors) {
   AssertErrors({
-      {"$struct S {\n$variant+ V { int32; }; };", "(2) : error : '+' modifier not permitted on nested variant"},
-      {"$enum V;\n$variant V;", "(2) : error : $variant V conflicts with previous declaration of $enum V"},
-      {"$variant V { void; };\n$variant V { void; };", "(2) : error : Repeated definition of $variant V"},
-      {"$variant V <<\ndc>> { };", "(2) : error : Unrecognised qualifier << dc >> on $variant V"},
-      {"$variant V\nint32;", "(2) : error : Expected { after V when read int32"},
-      {"$variant V { default 1", "(1) : error : Met EOS before read ';'"},
-      {"$variant V {", "(1) : error : Met EOS before read matching brace for $variant block"},
-      {"$variant V { { int32 a;", "(1) : error : Met EOS before read matching brace for struct within $variant block"},
-      {"$variant V { {\nint32 f(); } s; };", "(2) : error : Syntax error : ("},
-      {"$variant V {\nint32 f(); };", "(2) : error : Syntax error : ("},
-      {"$variant V {\n7; };", "(2) : error : Syntax error : 7"},
-      {"$variant V { { int32 a } s; };", "(1) : error : ; expected after type definition when read }"},
-      {"$variant V { int32 a }", "(1) : error : ; expected after type definition when read }"},
-      {"$variant V { { int32; } s; };", "(1) : error : Expected identifier after int32 when read ;"},
-      {"$variant V { { int32 a; }; };", "(1) : error : Expected identifier after } when read ;"},
-      {"$variant V { void;\nvoid; };",
-       "(2) : error : Variant V : anonymous type 'void' incompatible with a default value"},
-      {"$variant V { default 1;\nvoid; };",
-       "(2) : error : Variant V : anonymous type 'void' incompatible with a default value"},
-      {"$variant V {\n};", "(2) : error : $variant V is empty"},
-      {"$variant V { int32; $ };", "(1) : error : Expected } after ; when read $"},
-      {"$variant V { int32; }\nint x;", "(2) : error : ; expected after definition of $variant V when read int"},
+      {"$struct S {\n$variant+ V { int32; }; };", 2, "'+' modifier not permitted on nested variant"},
+      {"$enum V;\n$variant V;", 2, "$variant V conflicts with previous declaration of $enum V"},
+      {"$variant V { void; };\n$variant V { void; };", 2, "Repeated definition of $variant V"},
+      {"$variant V <<\ndc>> { };", 2, "Unrecognised qualifier << dc >> on $variant V"},
+      {"$variant V\nint32;", 2, "Expected { after V when read int32"},
+      {"$variant V { default 1", 1, "Met EOS before read ';'"},
+      {"$variant V {", 1, "Met EOS before read matching brace for $variant block"},
+      {"$variant V { { int32 a;", 1, "Met EOS before read matching brace for struct within $variant block"},
+      {"$variant V { {\nint32 f(); } s; };", 2, "Syntax error : ("},
+      {"$variant V {\nint32 f(); };", 2, "Syntax error : ("},
+      {"$variant V {\n7; };", 2, "Syntax error : 7"},
+      {"$variant V { { int32 a } s; };", 1, "; expected after type definition when read }"},
+      {"$variant V { int32 a }", 1, "; expected after type definition when read }"},
+      {"$variant V { { int32; } s; };", 1, "Expected identifier after int32 when read ;"},
+      {"$variant V { { int32 a; }; };", 1, "Expected identifier after } when read ;"},
+      {"$variant V { void;\nvoid; };", 2, "Variant V : anonymous type 'void' incompatible with a default value"},
+      {"$variant V { default 1;\nvoid; };", 2, "Variant V : anonymous type 'void' incompatible with a default value"},
+      {"$variant V {\n};", 2, "$variant V is empty"},
+      {"$variant V { int32; $ };", 1, "Expected } after ; when read $"},
+      {"$variant V { int32; }\nint x;", 2, "; expected after definition of $variant V when read int"},
   });
 }
 
@@ -442,13 +440,12 @@ inline void g(A& a)
 
 TEST_F(VariantsTest, PolymorphicErrors) {
   AssertErrors({
-      {"$variant A { int32; };\n$polymorphic void f([A a]) { }",
-       "(2) : error : ; expected after definition of $function f when read {"},
-      {"$variant A { int32; };\n$function void f([A a]);",
-       "(2) : error : '[' unexpected.  Polymorphic argument not allowed here"},
-      {"$variant A { int32; };\n$polymorphic void f([A a);", "(2) : error : Expected ] after a when read )"},
-      {"$polymorphic void f([int32 a]);", "(1) : error : Polymorphic argument a is not a defined $variant"},
-      {"$variant A;\n$polymorphic void f([A a]);", "(2) : error : Polymorphic argument a is not a defined $variant"},
+      {"$variant A { int32; };\n$polymorphic void f([A a]) { }", 2,
+       "; expected after definition of $function f when read {"},
+      {"$variant A { int32; };\n$function void f([A a]);", 2, "'[' unexpected.  Polymorphic argument not allowed here"},
+      {"$variant A { int32; };\n$polymorphic void f([A a);", 2, "Expected ] after a when read )"},
+      {"$polymorphic void f([int32 a]);", 1, "Polymorphic argument a is not a defined $variant"},
+      {"$variant A;\n$polymorphic void f([A a]);", 2, "Polymorphic argument a is not a defined $variant"},
   });
 }
 
