@@ -3,7 +3,6 @@
 #include "translate_fixture.h"
 
 namespace qrex {
-
 namespace {
 
 // In expected texts S and C stand for the object that operations and barriers take, W and R for the barriers of the
@@ -339,5 +338,4 @@ TEST_F(AccessorsTest, NestingIsBounded) {
 }
 
 }  // namespace
-
 }  // namespace qrex

@@ -73,16 +73,14 @@ vesk::xvector<vesk::int32> const& f() const
 }
 
 TEST_F(CachedFunctionsTest, AsyncKeyedByOne) {
-  EXPECT_EQ(R"~(vesk::int32 _calc_f(vesk::string8 const& k="") const
+  const std::string text = Body("$cache <<io async -io>> int32 f(string8 const& k = \"\") const { }\n", "$mixin M");
+  EXPECT_EQ(R"(vesk::int32 _calc_f(vesk::string8 const& k="") const
 { }
 
 struct _depnode_f : public vesk::DGKeyedAsyncIndepNode<_depnode_f,M,vesk::string8,vesk::int32>
-{
-    typedef vesk::DGKeyedAsyncIndepNode<_depnode_f,M,vesk::string8,vesk::int32> base;
-    using typename base::key_type;
-    using typename base::output_type;
-    using typename base::map_type;
-    static void CalcOutput(const M* _self, output_type& _output, const key_type& _key)
+)",
+            Section(text, "", "{\n    typedef"));
+  EXPECT_EQ(R"(    static void CalcOutput(const M* _self, output_type& _output, const key_type& _key)
     {
         _output = _self->_calc_f(_key);
     }
@@ -98,8 +96,8 @@ vesk::int32 const& f(vesk::string8 const& k="") const
 {
     return _map_f[k].read(this);
 }
-)~",
-            Body("$cache <<io async -io>> int32 f(string8 const& k = \"\") const { }\n", "$mixin M"));
+)",
+            Section(text, "map_type;\n", ""));
 }
 
 TEST_F(CachedFunctionsTest, KeyedBySeveralByReference) {

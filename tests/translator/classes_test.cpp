@@ -1,7 +1,5 @@
 // Class statements: whole headers and tails, each variation of the head and the members, and all that may be wrong.
 
-#include <sstream>
-
 #include "translator/translate_fixture.h"
 
 namespace qrex {
@@ -14,25 +12,6 @@ class ClassesTest : public TranslateTest {
     std::string header = TranslateHeader(text).header;
     const size_t traits = header.rfind("} // namespace vesk\n");
     return traits == std::string::npos ? header : header.substr(traits + 20);
-  }
-  static std::string Traits(const std::string& keyword, const std::string& name, const std::string& flags,
-                            const std::string& classFlags) {
-    std::istringstream names(
-        "is_exported is_reflected is_registered has_metadata has_reflected_default_ctor has_reflected_dtor "
-        "has_reflected_copy_ctor has_reflected_equality has_reflected_compare has_reflected_write_xostream "
-        "has_reflected_serialise has_reflected_visit_IObjects has_reflected_visit_Prefs implements_IObject "
-        "implements_IPersistable can_serialise_model has_model using_model_base_class");
-    auto line = [&](char value) {
-      std::string flag;
-      names >> flag;
-      return "    static const bool " + flag + " = " + value + ";\n";
-    };
-    std::string text = "namespace vesk\n{\ntemplate<> struct TypeTraits<" + name + ">\n{\n";
-    for (size_t i = 0; i < 3; ++i) text += line(flags[i]);
-    text += "    static const vesk::ETypeTraitKind kind = vesk::TTK_" + keyword + ";\n";
-    text += line(flags[3]) + "};\ntemplate<> struct ClassTypeTraits<" + name + ">\n{\n";
-    for (char flag : classFlags) text += line(flag);
-    return text + "};\n";
   }
 };
 
@@ -77,7 +56,7 @@ namespace geo
 struct Point;
 
 } //geo
-)" + Traits("struct", "geo::Point", "0000", "00000000000000") +
+)" + TraitsText("geo::Point", "struct", "000000000000000000") +
           R"(} // namespace vesk
 namespace geo
 {
@@ -96,7 +75,7 @@ public:
 class Shape;
 
 } //geo
-)" + Traits("class", "geo::Shape", "1111", "11100000010000") +
+)" + TraitsText("geo::Shape", "class", "111111100000010000") +
           R"(template<> struct directly_implements_interface<geo::Shape,vesk::IObject> { static const bool value = true; };
 } // namespace vesk
 namespace geo
@@ -157,22 +136,7 @@ public:
             0,0,0,
             0,
             0,
-            {
-                sizeof(Pair),
-                0,
-                0,
-                0,
-                (vesk::ConstructArrayFn) (void (*)( Pair*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<Pair>,
-                (vesk::CopyConstructArrayFn) (void (*)(Pair*, vesk::ssize_t, Pair const*, vesk::ssize_t, vesk::ssize_t)) vesk::CopyConstructArray<Pair>,
-                (vesk::AssignArrayFn) (void (*)(Pair*, vesk::ssize_t, Pair const*, vesk::ssize_t, vesk::ssize_t)) vesk::AssignArray<Pair>,
-                (vesk::DestructArrayFn) (void (*)( Pair*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<Pair>,
-                0,
-                0,
-                0,
-                0,
-                0,
-                0
-            }
+            { sizeof(Pair), 0, 0, 0, ConstructArray, CopyConstructArray, AssignArray, DestructArray, 0, 0, 0, 0, 0, 0 }
         };
         
         return Pair_class;
@@ -203,56 +167,17 @@ namespace geo
     }
     app_API vesk::ReflectedClass const& _GetReflected(Shape const*)
     {
-        static const vesk::octet_t Shape_metadata[] =
-        {
-            0xe2,0xa2,0x07,0x00,0x00,0x00,0xa4,0x00,0x00
-        };
-        static const vesk::octet_t Shape_name[] =
-        {
-            0xe1,0xc1,0x01,0x00,0xa2,0x01,0x00,0x00,0x00,0x10
-        };
-        static const vesk::octet_t Shape_points[] =
-        {
-            0x50,0x02,0x00,0x00,0x00,0x44,0x35,0x31,0x20,0x02,0x00
-        };
-        static const vesk::ReflectedField Shape_fields[] =
-        {
-            { "name", offsetof(Shape,name), Shape_name },
-            { "points", offsetof(Shape,points), Shape_points },
-        };
-        static const vesk::octet_t Shape_at_return[] =
-        {
-            0x35,0x31,0x20,0x02,0x00
-        };
-        static const vesk::octet_t Shape_at_i[] =
-        {
-            0x04
-        };
-        static const vesk::octet_t Shape_at_late[] =
-        {
-            0x36,0x20,0x03,0x00
-        };
-        static const vesk::ReflectedArg Shape_at_args[] =
-        {
-            { "i", Shape_at_i },
-            { "late", Shape_at_late },
-        };
-        static const vesk::ReflectedClassMethod Shape_methods[] =
-        {
-            {"at",{Shape_at_return},Shape_at_args,2,0,true,(vesk::FunctionPointer)(geo::Point const* (__stdcall *)(Shape const* _self,vesk::int32 i,Late& late))&geo::at},
-            {"clear",{0},0,0,0,false,(vesk::FunctionPointer)(void (__stdcall *)(Shape* _self))&geo::clear},
-        };
-        static vesk::ConstStringZ Shape_stringTable[] =
-        {
-            "meta",
-            "colour",
-            "geo::Point",
-            "Late",
-        };
-        static vesk::ConstStringZ Shape_interfaces[] =
-        {
-            "vesk::IObject",
-        };
+        static const vesk::octet_t Shape_metadata[] = { 0xe2,0xa2,0x07,0x00,0x00,0x00,0xa4,0x00,0x00 };
+        static const vesk::octet_t Shape_name[] = { 0xe1,0xc1,0x01,0x00,0xa2,0x01,0x00,0x00,0x00,0x10 };
+        static const vesk::octet_t Shape_points[] = { 0x50,0x02,0x00,0x00,0x00,0x44,0x35,0x31,0x20,0x02,0x00 };
+        static const vesk::ReflectedField Shape_fields[] = { { "name", offsetof(Shape,name), Shape_name }, { "points", offsetof(Shape,points), Shape_points }, };
+        static const vesk::octet_t Shape_at_return[] = { 0x35,0x31,0x20,0x02,0x00 };
+        static const vesk::octet_t Shape_at_i[] = { 0x04 };
+        static const vesk::octet_t Shape_at_late[] = { 0x36,0x20,0x03,0x00 };
+        static const vesk::ReflectedArg Shape_at_args[] = { { "i", Shape_at_i }, { "late", Shape_at_late }, };
+        static const vesk::ReflectedClassMethod Shape_methods[] = { {"at",{Shape_at_return},Shape_at_args,2,0,true,(vesk::FunctionPointer)(geo::Point const* (__stdcall *)(Shape const* _self,vesk::int32 i,Late& late))&geo::at}, {"clear",{0},0,0,0,false,(vesk::FunctionPointer)(void (__stdcall *)(Shape* _self))&geo::clear}, };
+        static vesk::ConstStringZ Shape_stringTable[] = { "meta", "colour", "geo::Point", "Late", };
+        static vesk::ConstStringZ Shape_interfaces[] = { "vesk::IObject", };
         static const vesk::ReflectedClass Shape_class =
         {
             1,
@@ -267,22 +192,7 @@ namespace geo
             Shape_interfaces,0,1,
             &vesk::IObject::Stubs<Shape>::GetTable(),
             &Shape::sfnCreateInstance,
-            {
-                sizeof(Shape),
-                0,
-                0,
-                0,
-                (vesk::ConstructArrayFn) (void (*)( Shape*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<Shape>,
-                (vesk::CopyConstructArrayFn) (void (*)(Shape*, vesk::ssize_t, Shape const*, vesk::ssize_t, vesk::ssize_t)) vesk::CopyConstructArray<Shape>,
-                (vesk::AssignArrayFn) (void (*)(Shape*, vesk::ssize_t, Shape const*, vesk::ssize_t, vesk::ssize_t)) vesk::AssignArray<Shape>,
-                (vesk::DestructArrayFn) (void (*)( Shape*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<Shape>,
-                0,
-                0,
-                0,
-                0,
-                0,
-                0
-            }
+            { sizeof(Shape), 0, 0, 0, ConstructArray, CopyConstructArray, AssignArray, DestructArray, 0, 0, 0, 0, 0, 0 }
         };
         
         return Shape_class;
@@ -425,36 +335,29 @@ TEST_F(ClassesTest, Operators) {
       << generated.header;
 }
 
+// The flags of the record, and its operations.
 TEST_F(ClassesTest, RecordsOfQualifiers) {
-  // The flags of the record, and the functions of its TypeOps.
-  auto flagsAndOps = [&](const std::string& text) {
-    const std::string tail = TranslateHeader(text).tail;
-    std::vector<std::string> lines;
-    SplitString(tail.substr(tail.find("_class =\n")), lines, "\n");
-    std::string result = lines[2].substr(lines[2].find_first_not_of(' '), lines[2].find(',') - 12);
-    for (size_t i = 3; lines[i].find("return") == std::string::npos; ++i) {
-      if (lines[i].find("Fn) (") == std::string::npos) continue;
-      const size_t name = lines[i].rfind(" vesk::") + 7;
-      result += " " + lines[i].substr(name, lines[i].find('<', name) - name);
-    }
-    return result;
+  const std::string none = "0, 0, 0, 0, 0, 0 ";
+  const std::string made = "ConstructArray, CopyConstructArray, AssignArray, DestructArray, ";
+  const std::array<std::string, 3> cases[] = {
+      {"$struct+ A { };", "0", "0, 0, 0, " + made + none},
+      {"$class+ A <<passbyvalue returnbyvalue rod>> { };", "225", "0, 0, 0, " + made + none},
+      {"$struct A <<reflect>> { };", "0", "0, 0, 0, " + made + none},
+      {"$struct+ A <<-dc -copy>> { };", "0", "0, 0, 0, 0, 0, 0, DestructArray, " + none},
+      {"$struct+ A <<abstract compare print ser copy dc>> { };", "0",
+       "VariableEqual, VariableLess, 0, 0, 0, 0, 0, 0, 0, 0, 0, BinaryLowerBound, BinaryUpperBound "},
+      {"$struct+ A <<os ser -copy>> { };", "0",
+       "0, 0, PrintVariable, ConstructArray, 0, 0, DestructArray, SerialiseArray, DeserialiseArray, 0, 0, 0, 0 "},
+      {"$struct+ A <<os -print>> { };", "0", "0, 0, 0, " + made + none},
+      {"$adt A { void f(); }; $adt implement A <<reflect>> { void f() { } };", "16", "0, 0, 0, 0, 0, 0, 0, " + none},
+      {"$struct+ A { $model { pref<vesk::IObject> p; } };", "4",
+       "0, 0, 0, " + made + "SerialiseArray, DeserialiseArray, VisitObjectsInArray, VisitPrefsInArray, 0, 0 "},
   };
-  const std::string all = " ConstructArray CopyConstructArray AssignArray DestructArray";
-  const std::pair<std::string, std::string> cases[] = {
-      {"$struct+ A { };", "0" + all},
-      {"$class+ A <<passbyvalue returnbyvalue rod>> { };", "225" + all},
-      {"$struct A <<reflect>> { };", "0" + all},
-      {"$struct+ A <<-dc -copy>> { };", "0 DestructArray"},
-      {"$struct+ A <<abstract compare print ser copy dc>> { };",
-       "0 VariableEqual VariableLess BinaryLowerBound BinaryUpperBound"},
-      {"$struct+ A <<os ser -copy>> { };",
-       "0 PrintVariable ConstructArray DestructArray SerialiseArray DeserialiseArray"},
-      {"$struct+ A <<os -print>> { };", "0" + all},
-      {"$adt A { void f(); }; $adt implement A <<reflect>> { void f() { } };", "16"},
-      {"$struct+ A { $model { pref<vesk::IObject> p; } };",
-       "4" + all + " SerialiseArray DeserialiseArray VisitObjectsInArray VisitPrefsInArray"},
-  };
-  for (const auto& [text, expected] : cases) EXPECT_EQ(expected, flagsAndOps(text)) << text;
+  for (const auto& [text, flags, operations] : cases) {
+    const std::string record = Section(Folded(TranslateHeader(text).tail), "A_class =\n        {\n", "        };");
+    EXPECT_EQ("            " + flags, record.substr(0, record.find(','))) << text;
+    EXPECT_EQ(operations, Section(record, "{ sizeof(A), ", "}")) << text;
+  }
 }
 
 TEST_F(ClassesTest, InterfacesOfRecords) {

@@ -87,14 +87,13 @@ namespace n
     }
 } // n
 )",
-            WithTablesOnLines(Translate("t.cpp")));
+            Folded(Translate("t.cpp")));
 }
 
 TEST_F(GlobalsTest, RecordsOnlyOfDefinedAndRegistered) {
-  AssertTail(
-      "$function+ void f(); $function <<reflect>> inline void g() { } $var <<reflect>> int32 v; "
-      "$typedef+ <<-register>> int32 T;",
-      "");
+  EXPECT_EQ("", TranslateHeader("$function+ void f(); $function <<reflect>> inline void g() { } "
+                                "$var <<reflect>> int32 v; $typedef+ <<-register>> int32 T;")
+                    .tail);
 }
 
 TEST_F(GlobalsTest, FunctionMessages) {
@@ -167,7 +166,7 @@ TEST_F(GlobalsTest, Variables) {
         vxVerify(vesk::RegisterReflectedGlobalVariable(&p_var,vesk::app_GetXTarget()) == vesk::NSE_OK);
     }
 )"),
-            WithTablesOnLines(TranslateHeader("$var+ vesk::pref<vesk::IObject> p[3];\n").tail));
+            Folded(TranslateHeader("$var+ vesk::pref<vesk::IObject> p[3];\n").tail));
 }
 
 TEST_F(GlobalsTest, VariableErrors) {
@@ -193,9 +192,9 @@ inline vesk::ConstStringZ GetTypedefName_T()
 }
  }
 )");
-  const Generated generated = TranslateHeader("$typedef+ <<extern>> xmap<int32,string8> T;\n");
-  EXPECT_EQ(";\ninline vesk::ConstStringZ GetTypedefName_T()\n{\n    return \"T\";\n}\n\n", generated.header);
-  EXPECT_EQ(TailText("$typedef+ T", R"(    void _Register_T()
+  AssertGenerated("$typedef+ <<extern>> xmap<int32,string8> T;\n",
+                  ";\ninline vesk::ConstStringZ GetTypedefName_T()\n{\n    return \"T\";\n}\n\n",
+                  TailText("$typedef+ T", R"(    void _Register_T()
     {
         static const vesk::octet_t T_type[] = { 0x51,0x04,0x10 };
         static const vesk::ReflectedTypedef T_typedef =
@@ -206,8 +205,7 @@ inline vesk::ConstStringZ GetTypedefName_T()
         };
         vxVerify(vesk::RegisterReflectedTypedef(&T_typedef,vesk::app_GetXTarget()) == vesk::NSE_OK);
     }
-)"),
-            WithTablesOnLines(generated.tail));
+)"));
 }
 
 TEST_F(GlobalsTest, TypedefMessagesAndErrors) {

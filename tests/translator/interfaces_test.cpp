@@ -1,7 +1,6 @@
 #include "translate_fixture.h"
 
 namespace qrex {
-
 namespace {
 
 using InterfacesTest = TranslateTest;
@@ -94,17 +93,7 @@ struct DDelegatorMixin : public BC
 
 vesk::ReflectedInterface const& _GetReflected(D const*);
 
-namespace vesk
-{
-template<> struct TypeTraits<D>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 1;
-};
-template<> struct InterfaceTypeTraits<D>
+)" + TraitsText("D", "interface", "1111") + R"(template<> struct InterfaceTypeTraits<D>
 {
     static const bool is_ipc = false;
     static const bool is_rmi = false;
@@ -115,7 +104,7 @@ template<> struct _is_indirect_superinterface_of<A,D> { static const bool value 
 } // namespace vesk
 
 )");
-  EXPECT_EQ(WithTablesOnLines(Section(generated.tail, "_GetReflected(D const*)\n", "    \n    // Registration")),
+  EXPECT_EQ(Folded(Section(generated.tail, "_GetReflected(D const*)\n", "    \n    // Registration")),
             R"(    {
         static const vesk::octet_t D_metadata[] = { 0xe1,0xa4,0x00,0x00 };
         static vesk::ConstStringZ D_bases[] = { "K", "L", };
@@ -241,8 +230,7 @@ template<> struct indirectly_implements_interface<K,A> { static const bool value
   const std::string tail = TranslateHeader(declarations).tail;
   EXPECT_EQ(Section(tail, "sfnCreateInstance()\n", "    vesk::ReflectedClass"),
             "    {\n        return static_cast<vesk::ptr<B> >(new K());\n    }\n");
-  EXPECT_EQ(Section(WithTablesOnLines(tail), "K_interfaces[] = ", "\n"),
-            "{ \"vesk::IObject\", \"A\", \"U\", \"B\", };");
+  EXPECT_EQ(Section(Folded(tail), "K_interfaces[] = ", "\n"), "{ \"vesk::IObject\", \"A\", \"U\", \"B\", };");
   EXPECT_EQ(Section(tail, "            K_interfaces,", "            {\n"),
             "2,2,\n            &vesk::IObject::Stubs<K>::GetTable(),\n            &K::sfnCreateInstance,\n");
   EXPECT_EQ(tail.find("GetReflectedInterface<U >"), tail.npos);
@@ -304,5 +292,4 @@ TEST_F(InterfacesTest, Faults) {
 }
 
 }  // namespace
-
 }  // namespace qrex

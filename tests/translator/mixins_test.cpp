@@ -1,7 +1,6 @@
 #include "translate_fixture.h"
 
 namespace qrex {
-
 namespace {
 
 using MixinsTest = TranslateTest;
@@ -99,17 +98,7 @@ app_API vesk::int32 __stdcall get(A const* _self,vesk::int32 i);
 
 app_API void __stdcall set(A* _self,vesk::string8 const& s);
 
-namespace vesk
-{
-template<> struct TypeTraits<A>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_adt;
-    static const bool has_metadata = 1;
-};
-)");
+)" + TraitsText("A", "adt", "1111"));
   const std::string source = Translate("a.cpp", R"(@import "t.h"
 $adt+ implement A
 {
@@ -183,5 +172,4 @@ TEST_F(MixinsTest, Faults) {
 }
 
 }  // namespace
-
 }  // namespace qrex

@@ -91,8 +91,11 @@ TEST_F(LookUp, Ambiguity) {
 }
 
 TEST_F(NameSpaceTest, Conflicts) {
-  const std::array<std::string, 3> cases[] = {
-      // the text, the error and where it sends the reader
+  const struct {
+    std::string text;
+    int line;
+    std::string error, place;  // where the error sends the reader
+  } cases[] = {
       {"\n$struct A;\n$class A;", 3, "$class A conflicts with previous declaration of $struct A",
        "(2) : see declaration of $struct A"},
       {"namespace n { $enum+ E { x };\n$struct E { }; }", 2,
@@ -101,10 +104,9 @@ TEST_F(NameSpaceTest, Conflicts) {
        "(2) : see declaration of $namespace n"},
       {"$struct B { };\n$struct B { };", 2, "Repeated definition of $struct B", "(1) : see declaration of $struct B"},
   };
-  for (const auto& [text, error, place] : cases) {
-    MakeWorld(TargetType::Application);
-    EXPECT_EQ("t.cpp" + error, Fault(text));
-    EXPECT_EQ("t.cpp" + place + "\n", Messages());
+  for (const auto& [text, line, error, place] : cases) {
+    AssertErrors({{text, line, error}});
+    EXPECT_EQ("t.h" + place + "\n", Messages());
   }
 }
 

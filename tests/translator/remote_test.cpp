@@ -1,7 +1,6 @@
 #include "translate_fixture.h"
 
 namespace qrex {
-
 namespace {
 
 class RemoteTest : public TranslateTest {
@@ -181,5 +180,4 @@ TEST_F(RemoteTest, Faults) {
 }
 
 }  // namespace
-
 }  // namespace qrex

@@ -9,6 +9,7 @@
 #include <filesystem>
 #include <map>
 #include <memory>
+#include <sstream>
 #include <string>
 #include <vector>
 
@@ -169,11 +170,11 @@ class TranslateTest : public ::testing::Test, public TraceHook {
   void AssertHeader(const std::string& text, const std::string& header) {
     ASSERT_EQ(header, TranslateHeader(text).header);
   }
-  void AssertTail(const std::string& text, const std::string& tail) { ASSERT_EQ(tail, TranslateHeader(text).tail); }
+  // Both texts with their tables on lines.
   void AssertGenerated(const std::string& text, const std::string& header, const std::string& tail) {
     const Generated generated = TranslateHeader(text);
-    ASSERT_EQ(header, generated.header);
-    ASSERT_EQ(tail, generated.tail);
+    ASSERT_EQ(header, Folded(generated.header));
+    ASSERT_EQ(tail, Folded(generated.tail));
   }
 
   // What stands behind the first `begin`, up to the first `end` behind it; all the rest when `end` is empty.
@@ -184,21 +185,27 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     return text.substr(start, end.empty() ? end.npos : text.find(end, start) - start);
   }
 
-  // With each table of a record on one line: "static T N[] = { row, row, };".
-  static std::string WithTablesOnLines(const std::string& text) {
+  // With each table of a record on one line, "static T N[] = { row, row, };", and so its operations, by their names:
+  // "{ sizeof(T), 0, VariableLess, ... }".
+  static std::string Folded(const std::string& text) {
+    std::istringstream lines(text);
     std::string result;
-    size_t from = 0;
-    for (size_t at; (at = text.find("[] =\n", from)) != text.npos;) {
-      const size_t end = text.find("};", at);
-      for (; from < end; ++from) {
-        if (from < at || !std::isspace(static_cast<unsigned char>(text[from]))) {
-          result += text[from];
-        } else if (result.back() != ' ') {
-          result += ' ';
-        }
+    bool folding = false;
+    for (std::string line; std::getline(lines, line);) {
+      const size_t indent = std::min(line.find_first_not_of(' '), line.size());
+      if (result.ends_with("[] =\n") || (result.ends_with("{\n") && line.compare(indent, 7, "sizeof(") == 0)) {
+        result.back() = ' ';
+        folding = true;
       }
+      if (folding) line.erase(0, indent);
+      if (size_t name = line.find(")) vesk::"); folding && name != line.npos && line.find("Fn) (") != line.npos) {
+        name += 9;
+        line = line.substr(name, line.find('<', name) - name) + (line.back() == ',' ? "," : "");
+      }
+      folding = folding && !line.starts_with("}");
+      result += line + (folding ? ' ' : '\n');
     }
-    return result + text.substr(from);
+    return result;
   }
 
   // The tail of an element of the root name space; `record` is indented. `element`: as printed, "$enum+ E".
@@ -212,14 +219,21 @@ class TranslateTest : public ::testing::Test, public TraceHook {
            "*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);\n    }\n";
   }
 
-  // The TypeTraits block of an element of the root name space. `flags`: exported, reflected, registered, metadata.
-  static std::string TraitsText(const std::string& name, const std::string& kind, const char (&flags)[5]) {
-    static constexpr std::string_view kLines[] = {"is_exported", "is_reflected", "is_registered"};
-    std::string text = "\nnamespace vesk\n{\ntemplate<> struct TypeTraits<" + name + ">\n{\n";
-    for (size_t i = 0; i < 3; ++i) text += "    static const bool " + std::string(kLines[i]) + " = " + flags[i] + ";\n";
-    text += "    static const vesk::ETypeTraitKind kind = vesk::TTK_" + kind + ";\n";
-    text += std::string("    static const bool has_metadata = ") + flags[3] + ";\n";
-    return text + "};\n} // namespace vesk\n";
+  // The traits of an element up to the end of the name space. `flags`: exported, reflected, registered, metadata;
+  // behind them, of a class, those of its ClassTypeTraits in order.
+  static std::string TraitsText(const std::string& name, const std::string& kind, const std::string& flags) {
+    std::istringstream names(
+        "is_exported is_reflected is_registered has_metadata has_reflected_default_ctor has_reflected_dtor "
+        "has_reflected_copy_ctor has_reflected_equality has_reflected_compare has_reflected_write_xostream "
+        "has_reflected_serialise has_reflected_visit_IObjects has_reflected_visit_Prefs implements_IObject "
+        "implements_IPersistable can_serialise_model has_model using_model_base_class");
+    std::string text = "namespace vesk\n{\ntemplate<> struct TypeTraits<" + name + ">\n{\n", flag;
+    for (size_t i = 0; i < flags.size() && names >> flag; ++i) {
+      if (i == 3) text += "    static const vesk::ETypeTraitKind kind = vesk::TTK_" + kind + ";\n";
+      if (i == 4) text += "};\ntemplate<> struct ClassTypeTraits<" + name + ">\n{\n";
+      text += "    static const bool " + flag + " = " + flags[i] + ";\n";
+    }
+    return text + "};\n";
   }
 
   // The printed form of the error that the translation of `text` raises.

@@ -25,7 +25,6 @@ class TypesTest : public TranslateTest {
     const TextRange range{std::string_view(*m_texts.back())};
     SourceMap map;
     map.AddVerbatim(range.begin, range.end);
-    MemoryTextWriter sink;
     struct Target : IOutputStream {
       void Write(const void*, size_t) override {}
       void Flush() override {}
@@ -40,6 +39,12 @@ class TypesTest : public TranslateTest {
     } catch (const IException& exception) {
       return ExceptionText(exception);
     }
+  }
+
+  using Texts = std::vector<std::pair<std::string, std::string>>;
+  template <typename Read>
+  void AssertFaults(const Texts& cases, Read read) {
+    for (const auto& [text, message] : cases) EXPECT_EQ(message.empty() ? "" : "error : " + message, Parse(text, read));
   }
 
   TypeCode CodeOf(const std::string& text, bool reflected = true) {
@@ -115,14 +120,12 @@ TEST_F(TypesTest, UnreflectedTypesStayText) {
 }
 
 TEST_F(TypesTest, Faults) {
-  auto fault = [&](const std::string& text) {
+  const auto read = [](QrexParser& parser) {
     TypeCode code;
     std::string name;
-    return Parse(text, [&](QrexParser& parser) {
-      if (!parser.ParseTypeWithName(code, &name, true, nullptr, true)) parser.Fail("no type");
-    });
+    if (!parser.ParseTypeWithName(code, &name, true, nullptr, true)) parser.Fail("no type");
   };
-  const std::pair<std::string, std::string> cases[] = {
+  const Texts cases = {
       {"1", "no type"},
       {"int x", "Can't accept platform dependent type: int"},
       {"const unsigned x", "Can't accept platform dependent type: unsigned"},
@@ -146,7 +149,7 @@ TEST_F(TypesTest, Faults) {
       {"int32 x[2;", "Expected ] after 2 when read ;"},
       {"int32 x : 1", "Expected [ after : when read 1"},
   };
-  for (const auto& [text, message] : cases) EXPECT_EQ("error : " + message, fault(text)) << text;
+  AssertFaults(cases, read);
   EXPECT_EQ("error : Reached end of stream while scanning for matching >", Parse("std::vector<int", [](QrexParser& p) {
               TypeCode code;
               p.ParseTypeWithName(code, nullptr, false, nullptr, false);
@@ -154,18 +157,16 @@ TEST_F(TypesTest, Faults) {
 }
 
 TEST_F(TypesTest, MetadataLimitsAndFaults) {
-  auto fault = [&](const std::string& text) {
-    return Parse(text, [&](QrexParser& parser) {
-      std::string metadata;
-      parser.ParseMetadataList(metadata);
-    });
+  const auto read = [](QrexParser& parser) {
+    std::string metadata;
+    parser.ParseMetadataList(metadata);
   };
   auto values = [](int count) {
     std::string text = "1";
     for (int i = 1; i < count; ++i) text += ",1";
     return text;
   };
-  const std::pair<std::string, std::string> cases[] = {
+  const Texts cases = {
       {"[" + values(32) + "]", "Maximum list size exceeded"},
       {"[f(" + values(32) + ")]", "Maximum functor arglist size exceeded"},
       {"[1 2]", ", or ] expected in meta-data list when read 2"},
@@ -173,10 +174,10 @@ TEST_F(TypesTest, MetadataLimitsAndFaults) {
       {"[f(1;", ", or ) expected in functor arglist when read ;"},
       {"[4294967296]", "64-bit integer metadata not supported"},
       {"[[1], [f(2147483648)]]", "64-bit integer metadata not supported"},
+      {"[" + values(31) + "]", ""},
+      {"[f(" + values(31) + "), -2147483648, [[], g()]]", ""},
   };
-  for (const auto& [text, message] : cases) EXPECT_EQ("error : " + message, fault(text)) << text;
-  EXPECT_EQ("", fault("[" + values(31) + "]"));
-  EXPECT_EQ("", fault("[f(" + values(31) + "), -2147483648, [[], g()]]"));
+  AssertFaults(cases, read);
 }
 
 TEST_F(TypesTest, Signatures) {
@@ -189,7 +190,11 @@ TEST_F(TypesTest, Signatures) {
   EXPECT_TRUE(signature.arguments.front().polymorphic);
   EXPECT_EQ("e1 a2 01 00 00 00", Hex(signature.metadata));
 
-  const std::pair<std::string, std::string> cases[] = {
+  const auto read = [](QrexParser& parser) {
+    FunctionSignature ignored;
+    parser.ParseFunctionSignature(ignored, false, false, false, true);
+  };
+  const Texts cases = {
       {"1", "Type expected when read 1"},
       {"int32 1", "Function name expected when read 1"},
       {"int32 f;", "Expected ( after f when read ;"},
@@ -198,22 +203,15 @@ TEST_F(TypesTest, Signatures) {
       {"int32 f(int32 a; )", ", or ) expected in argument list when read ;"},
       {"int32 f() const", "const specifier on global function prohibited"},
   };
-  for (const auto& [text, message] : cases) {
-    EXPECT_EQ("error : " + message, Parse(text, [](QrexParser& parser) {
-                FunctionSignature ignored;
-                parser.ParseFunctionSignature(ignored, false, false, false, true);
-              }));
-  }
+  AssertFaults(cases, read);
 }
 
 TEST_F(TypesTest, DirectionsOfRemoteArguments) {
-  auto fault = [&](const std::string& text) {
-    return Parse(text, [](QrexParser& parser) {
-      FunctionArg arg;
-      parser.ParseFunctionArg(arg, true, true);
-    });
+  const auto read = [](QrexParser& parser) {
+    FunctionArg arg;
+    parser.ParseFunctionArg(arg, true, true);
   };
-  const std::pair<std::string, std::string> cases[] = {
+  const Texts cases = {
       {"int32 a", "[in] or [out] expected when read int32"},
       {"[into] int32 a", "in,out,inout or copy expected when read into"},
       {"[in int32 a", "Expected ] after in when read int32"},
@@ -227,10 +225,10 @@ TEST_F(TypesTest, DirectionsOfRemoteArguments) {
       {"[copy] int32 const* a", "copy parameter a cannot be passed by pointer to const"},
       {"[copy] int32** a", "'copy' parameter a : cannot marshall pointer type"},
   };
-  for (const auto& [text, message] : cases) EXPECT_EQ("error : " + message, fault(text)) << text;
+  AssertFaults(cases, read);
   for (const std::string text : {"[in] int32 a", "[in] K const& a", "[in] K const a", "[out] K& a", "[inout] int32& a",
                                  "[copy] K* a", "[in] int32 : [1] a"}) {
-    EXPECT_EQ("", fault(text)) << text;
+    AssertFaults({{text, ""}}, read);
   }
 }
 
@@ -408,18 +406,23 @@ TEST_F(TypesTest, TypeOperations) {
   MemoryTextWriter out;
   WriteTypeOps(out, "T", 0);
   EXPECT_EQ("sizeof(T),\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0,\n0\n", out.TakeText());
-  WriteTypeOps(out, "T", kOpsLess | kOpsCopy);
-  EXPECT_EQ(
-      "sizeof(T),\n0,\n(vesk::CompareVariableFn) (bool (*)(T const*, T const*)) vesk::VariableLess<T>,\n0,\n0,\n"
-      "(vesk::CopyConstructArrayFn) (void (*)(T*, vesk::ssize_t, T const*, vesk::ssize_t, vesk::ssize_t)) "
-      "vesk::CopyConstructArray<T>,\n"
-      "(vesk::AssignArrayFn) (void (*)(T*, vesk::ssize_t, T const*, vesk::ssize_t, vesk::ssize_t)) "
-      "vesk::AssignArray<T>,\n0,\n0,\n0,\n0,\n0,\n"
-      "(vesk::FindInArrayFn) (vesk::ssize_t (*)(T const*, vesk::ssize_t, vesk::ssize_t, T const*)) "
-      "vesk::BinaryLowerBound<T>,\n"
-      "(vesk::FindInArrayFn) (vesk::ssize_t (*)(T const*, vesk::ssize_t, vesk::ssize_t, T const*)) "
-      "vesk::BinaryUpperBound<T>\n",
-      out.TakeText());
+  WriteTypeOps(out, "T", kOpsAll);
+  EXPECT_EQ(R"(sizeof(T),
+(vesk::CompareVariableFn) (bool (*)(T const*, T const*)) vesk::VariableEqual<T>,
+(vesk::CompareVariableFn) (bool (*)(T const*, T const*)) vesk::VariableLess<T>,
+(vesk::PrintVariableFn) (void (*)(vesk::xostream&, T const*)) vesk::PrintVariable<T>,
+(vesk::ConstructArrayFn) (void (*)( T*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<T>,
+(vesk::CopyConstructArrayFn) (void (*)(T*, vesk::ssize_t, T const*, vesk::ssize_t, vesk::ssize_t)) vesk::CopyConstructArray<T>,
+(vesk::AssignArrayFn) (void (*)(T*, vesk::ssize_t, T const*, vesk::ssize_t, vesk::ssize_t)) vesk::AssignArray<T>,
+(vesk::DestructArrayFn) (void (*)( T*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<T>,
+(vesk::SerialiseArrayFn) (void (*)(vesk::Archive&, T const*, vesk::ssize_t, vesk::ssize_t)) vesk::SerialiseArray<T>,
+(vesk::DeserialiseArrayFn) (void (*)(vesk::InputArchive&, T*, vesk::ssize_t, vesk::ssize_t)) vesk::DeserialiseArray<T>,
+(vesk::VisitObjectsInArrayFn) (void (*)(vesk::IObjectVisitor&, T const*, vesk::ssize_t, vesk::ssize_t)) vesk::VisitObjectsInArray<T>,
+(vesk::VisitPrefsInArrayFn) (void (*)(vesk::IPrefVisitor&, T const*, vesk::ssize_t, vesk::ssize_t)) vesk::VisitPrefsInArray<T>,
+(vesk::FindInArrayFn) (vesk::ssize_t (*)(T const*, vesk::ssize_t, vesk::ssize_t, T const*)) vesk::BinaryLowerBound<T>,
+(vesk::FindInArrayFn) (vesk::ssize_t (*)(T const*, vesk::ssize_t, vesk::ssize_t, T const*)) vesk::BinaryUpperBound<T>
+)",
+            out.TakeText());
 }
 
 }  // namespace
