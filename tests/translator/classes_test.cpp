@@ -22,11 +22,7 @@ TEST_F(ClassesTest, WholeHeaderAndTail) {
 $class+ Later isa vesk::IObject;
 namespace geo
 {
-$struct Point
-{
-    int x;
-    $int32 y;
-};
+$struct Point { int x; $int32 y; };
 $class+ Shape isa vesk::IObject : Base,private other::Base<int> : [ 7, "meta" ]
 {
 public:
@@ -38,11 +34,7 @@ public:
 private:
     int m_count;
 };
-$class Pair<typename T, int N> <<reflect>>
-{
-public:
-    T items[N];
-};
+$class Pair<typename T, int N> <<reflect>> { public: T items[N]; };
 }
 )",
       R"(class Late;
@@ -61,10 +53,7 @@ struct Point;
 namespace geo
 {
 struct Point
-{
-    int x;
-    vesk::int32 y;
-
+{ int x; vesk::int32 y; 
 public:
     vesk::int32 Gety() const { return y; }
     void Sety(vesk::int32 _v) { y = _v; }
@@ -114,10 +103,7 @@ inline geo::Point const* __stdcall at(Shape const* _self,vesk::int32 i,Late& lat
 inline void __stdcall clear(Shape* _self) { _self->clear(); }
 template <typename T, int N>
 class Pair
-{
-public:
-    T items[N];
-
+{ public: T items[N]; 
 public:
     
     friend vesk::ReflectedClass const& _GetReflected(Pair const*)
@@ -221,8 +207,8 @@ namespace geo
 )");
   EXPECT_EQ(
       "t.h(3) : warning W1008 : $class+ Later doesn't appear in public header of library\n"
-      "t.h(11) : warning W1008 : $class+ geo::Shape doesn't appear in public header of library\n"
-      "t.h(11) : warning W1002 : Reflected $class+ geo::Shape references non-registered $struct geo::Point\n"
+      "t.h(7) : warning W1008 : $class+ geo::Shape doesn't appear in public header of library\n"
+      "t.h(7) : warning W1002 : Reflected $class+ geo::Shape references non-registered $struct geo::Point\n"
       "t.h(6) : see declaration of $struct geo::Point\n",
       Messages());
 }

@@ -25,35 +25,17 @@ TEST_F(EnumsTest, ClassWithEveryPart) {
     enum { LEN = 4 };
     static vesk::ConstStringZ const * stringArray()
     {
-        static vesk::ConstStringZ const _s[] = 
-        {
-            "low",
-            "mid",
-            "high",
-            "top",
-        };
+        static vesk::ConstStringZ const _s[] =  { "low", "mid", "high", "top", };
         return _s;
     }
     static const vesk::int32* valueArray()
     {
-        static const vesk::int32 _s[] = 
-        {
-            0,
-            1,
-            10,
-            11,
-        };
+        static const vesk::int32 _s[] =  { 0, 1, 10, 11, };
         return _s;
     }
     static const bool* enabledArray()
     {
-        static const bool _s[] = 
-        {
-            true,
-            false,
-            true,
-            true,
-        };
+        static const bool _s[] =  { true, false, true, true, };
         return _s;
     }
 };

@@ -8,11 +8,7 @@ using InterfacesTest = TranslateTest;
 constexpr char kDiamond[] = R"($interface+ A { void a(int32 i); };
 $interface+ K : A { int32 k() const; };
 $interface+ L : A { };
-$interface+ D : [ "doc" ] : K, L
-{
-    void d(const string8& s, int32 n=3);
-    int32 v;
-};
+$interface+ D : [ "doc" ] : K, L { void d(const string8& s, int32 n=3); int32 v; };
 )";
 
 TEST_F(InterfacesTest, DiamondWithAttributes) {
@@ -238,9 +234,6 @@ template<> struct indirectly_implements_interface<K,A> { static const bool value
     EXPECT_EQ(Section(tail, "if (&_ri == &vesk::GetReflectedInterface<" + base + " >()) ", "\n"),
               "{ vesk::ptr<" + base + "> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }");
   }
-  EXPECT_EQ(Section(TranslateHeader("$class P isa vesk::IPersistable { };\n").header,
-                    "namespace vesk\nclass P : public ", "\n"),
-            "vesk::PersistableMixin<vesk::IObjectBaseMixin<P,vesk::EmptyBase>>");
 }
 
 TEST_F(InterfacesTest, Warnings) {

@@ -76,16 +76,14 @@ TEST_F(LoopTest, DollarNew) {
 }
 
 TEST_F(LoopTest, InitAndUninit) {
+  const std::string text = Translate("app.cpp", "$init { a(); }\nnamespace n { $init {}\n}\n$uninit { b(); }\n");
   EXPECT_EQ(
-      "void _Register_app0()\n{ a(); }\nnamespace n { void _Register_app1()\n{}\n}\n"
-      "void _Unregister_app0()\n{ b(); }\n"
-      "\n\nvoid _Register_app0(); \nnamespace n { void _Register_app1(); }\n\n"
-      "void Register_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
-      "    s_called = true;\n    _Register_app0();\n    n::_Register_app1();\n}\n"
-      "\n\nvoid _Unregister_app0(); \n\n"
-      "void Unregister_Project_app()\n{\n    static bool s_called = false;\n    if (s_called) return;\n"
-      "    s_called = true;\n    _Unregister_app0();\n}\n",
-      Translate("app.cpp", "$init { a(); }\nnamespace n { $init {}\n}\n$uninit { b(); }\n"));
+      "void _Register_app0()\n{ a(); }\nnamespace n { void _Register_app1()\n{}\n}\nvoid _Unregister_app0()\n{ b(); }\n"
+      "\n\nvoid _Register_app0(); \nnamespace n { void _Register_app1(); }\n\n",
+      Section(text, "", "void Register_Project_app()"));
+  EXPECT_EQ("    _Register_app0();\n    n::_Register_app1();\n}\n\n\nvoid _Unregister_app0(); \n\n",
+            Section(text, "s_called = true;\n", "void Unregister"));
+  EXPECT_TRUE(text.ends_with("    _Unregister_app0();\n}\n"));
 }
 
 TEST_F(LoopTest, ErrorsOfDirectives) {

@@ -5,21 +5,10 @@ namespace {
 
 using MixinsTest = TranslateTest;
 
-constexpr char kListOfEverySort[] = R"($mixin M << reflect >>
-{
-    $int32 a;
-};
+constexpr char kListOfEverySort[] = R"($mixin M << reflect >> { $int32 a; };
 $model Pos { bool y; };
 namespace n { $mixin T { }; }
-$class+ K : mixin
-[
-    M
-    { $bool b; int plain; }
-    Pos
-    ? other::U <int, 3>
-    n::T<char>
-    model { int8 z; }
-]
+$class+ K : mixin [ M { $bool b; int plain; } Pos ? other::U <int, 3> n::T<char> model { int8 z; } ]
 {
 };
 )";
@@ -84,12 +73,7 @@ TEST_F(MixinsTest, RecordOfAClassWithMixins) {
 
 TEST_F(MixinsTest, AdtAndItsImplementation) {
   MakeWorld(TargetType::DynamicLinkLibrary);
-  const std::string adt = R"($adt+ A : [ 7 ]
-{
-    int32 get(int32 i) const;
-    void set(const string8& s);
-};
-)";
+  const std::string adt = "$adt+ A : [ 7 ] { int32 get(int32 i) const; void set(const string8& s); };\n";
   EXPECT_EQ(Section(TranslateHeader(adt).header, "", "template<> struct ClassTypeTraits"), R"(struct A;
 app_API vesk::ReflectedClass const& _GetReflected(A const*);
 app_API vesk::TypeOps const& _GetTypeOps(A const*);

@@ -149,21 +149,9 @@ inline vesk::xostream& operator<<(vesk::xostream& _os,Point const& _x)
 TEST_F(ModelsTest, ThreeReleases) {
   const std::string tail = TranslateHeader(R"($model+ Record
 {
-    string8 a;
-    int32 c;
-    float32 e;
-    xvector<int32> f;
-    $dropped
-    {
-        int32 b;
-        int64 d;
-    }
-    $schema
-    {
-        1: +a +b
-        3: -b +c +d +f
-        7: -d +e
-    }
+    string8 a; int32 c; float32 e; xvector<int32> f;
+    $dropped { int32 b; int64 d; }
+    $schema { 1: +a +b 3: -b +c +d +f 7: -d +e }
     $evolve
     {
         d(b) { d = b * 1000; }
@@ -261,20 +249,12 @@ TEST_F(ModelsTest, Comparisons) {
 }
 
 TEST_F(ModelsTest, Constructors) {
-  EXPECT_EQ(Section(TranslateHeader(R"($enum E { e1 };
-$model M
-{
-    E kind;
-    bool* flag;
-    offsettable<uint8> n;
-    xvector<int32> v;
-    explicit $$(bool* f)  : flag(f) { n = 1; }
-    $$(int a, int b) { }
-};
-)")
-                        .header,
-                    "struct M\n", "    M(E const&"),
-            R"({
+  EXPECT_EQ(
+      Section(TranslateHeader("$enum E { e1 }; $model M { E kind; bool* flag; offsettable<uint8> n; xvector<int32> v;\n"
+                              "    explicit $$(bool* f)  : flag(f) { n = 1; }\n    $$(int a, int b) { }\n};\n")
+                  .header,
+              "struct M\n", "    M(E const&"),
+      R"({
     explicit M(bool* f)  : flag(f) { n = 1; }
     M(int a, int b) { }
     
@@ -348,15 +328,8 @@ namespace vesk
 
 // The struct is N_model, and the functions of the class itself keep the data source's release number.
 TEST_F(ModelsTest, ClassThatDerivesFromItsModel) {
-  const std::string declarations = R"($interface+ I : vesk::IObject { };
-$struct+ S << multiline >> isa I : model
-{
-    pref<I> p;
-    int32 n;
-}
-{
-};
-)";
+  const std::string declarations =
+      "$interface+ I : vesk::IObject { };\n$struct+ S << multiline >> isa I : model { pref<I> p; int32 n; } { };\n";
   const std::string header = TranslateHeader(declarations).header;
   EXPECT_EQ(Section(header, "struct S_model\n", "bool operator<"), R"({
     

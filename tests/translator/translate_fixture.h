@@ -193,7 +193,8 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     bool folding = false;
     for (std::string line; std::getline(lines, line);) {
       const size_t indent = std::min(line.find_first_not_of(' '), line.size());
-      if (result.ends_with("[] =\n") || (result.ends_with("{\n") && line.compare(indent, 7, "sizeof(") == 0)) {
+      if (result.ends_with("[] =\n") || result.ends_with("[] = \n") ||
+          (result.ends_with("{\n") && line.compare(indent, 7, "sizeof(") == 0)) {
         result.back() = ' ';
         folding = true;
       }
