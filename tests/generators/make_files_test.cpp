@@ -169,6 +169,7 @@ TEST_F(MakeFilesTest, TargetsByCompilerAndKind) {
     EXPECT_EQ("\t" + std::string(command) + " $@ $(OBJS) $(LDFLAGS)\n", LinesOf("make_app_x64_Debug", "\t$("));
     EXPECT_EQ(linkFlags, LinesOf("make_app_x64_Debug", "LDFLAGS"));
     EXPECT_EQ(compiler == kWine ? "RC = wrc\n" : "", LinesOf("make_app_x64_Debug", "RC"));
+    EXPECT_EQ(compiler == kWine, LinesOf("make_app_x64_Debug", "CC") == "CC = winegcc\n");
   }
 }
 

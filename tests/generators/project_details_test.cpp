@@ -143,6 +143,15 @@ TEST_F(ProjectDetailsTest, UtilityProjects) {
   AssertHolds("app.vcxproj", "'=='Release|x64'\">\n  </ItemDefinitionGroup>\n");
 }
 
+TEST_F(ProjectDetailsTest, LibrarianOfTheNewFormat) {
+  AddProject("lib", "Static Library", "+link (\"Debug\") { /NOLOGO /EXPORT:\"f\" } { }");
+  LoadAndGenerate(CompilerKind::vc14, "lib/src/lib.qrpj");
+  EXPECT_EQ(trace,
+            "todo : librarian switch ExportNamedFunctions = f\nWriting lib.vcxproj\nWriting lib.vcxproj.filters\n"
+            "Writing all.sln\n");
+  AssertHolds("lib.vcxproj", "    <Lib>\n      <SuppressStartupBanner>true</SuppressStartupBanner>\n    </Lib>\n");
+}
+
 TEST_F(ProjectDetailsTest, IncludesOfAllRoots) {
   AddProject("app", "Application",
              R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj");
