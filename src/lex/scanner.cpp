@@ -1,5 +1,5 @@
 // The tokeniser. One table tells for each byte which class of token it can begin, so that a token costs one look-up and
-// the walk over its own bytes; words and single characters are read by NextToken itself. The classes and their order
+// the walk over its own bytes; words and single characters are read by ReadToken itself. The classes and their order
 // are those of the languages: a number, then a quoted string (ahead of identifiers, because of its raw prefix), an
 // identifier, a comment, then operators.
 
