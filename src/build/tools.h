@@ -13,8 +13,8 @@ namespace qrex {
 // What the compiler searches: the project's own directories, below the translation directory if `translated`, else
 // below its root; then every root of the tree.
 std::vector<std::string> IncludePaths(const Project& project, const ProjectConfig& config, bool translated);
-std::string CompiledDirectory(const Project& project,
-                              const ProjectConfig& config);  // of sources, as the compiler sees them
+// Of the sources, as the compiler sees them.
+std::string CompiledDirectory(const Project& project, const ProjectConfig& config);
 // exportLib/PLATFORM/CONFIG/, then the name with "lib" ahead and its extension behind as the gcc family has them.
 std::string GccTargetPath(const Project& project, const ProjectConfig& config);
 std::string_view GccTargetExtension(TargetType type);  // "a", "so", "???" of a utility project; empty for programs
