@@ -1,14 +1,18 @@
 #include "driver/run_workspace.h"
 
+#include <mutex>
 #include <string>
+#include <string_view>
 #include <unordered_set>
 
 #include "build/project_builder.h"
+#include "generators/common.h"
 #include "generators/exported_project.h"
 #include "generators/generate.h"
 #include "platform/console.h"
 #include "text/files.h"
 #include "text/output_policy.h"
+#include "text/parallel.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
 #include "text/trace.h"
@@ -30,11 +34,13 @@ class WorkspaceRun {
  private:
   bool LoadWorkspaceFile(const std::string& entry);
   bool RunProjects(ScopeTimer& timer);
+  void GenerateProjects();
+  void GenerateProject(Project& project);
   bool ProcessProject(Project& project);
+  void Prepare(const Project& project);
   void MakeDirectories(const Project& project);
   void CreateMissingFiles(Project& project) const;
   void Repackage(const Project& project) const;
-  bool ProcessTranslated(Project& project);
   bool BuildProject(Project& project);
   void GenerateWorkspace();
   ProjectFile* FindCompileFile(bool& found);
@@ -46,7 +52,7 @@ class WorkspaceRun {
   Workspace m_workspace;
   int64_t m_errors = 0;
   int64_t m_warnings = 0;
-  bool m_anyTranslated = false;
+  std::mutex m_preparing;
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
 };
 
@@ -142,11 +148,13 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
       names << project->name;
     }
     WriteIfChanged(names, m_workspace.name + ".projects");
+    GenerateProjects();
+    GenerateWorkspace();
+  } else {
+    for (const auto& project : m_workspace.projects) {
+      if (!ProcessProject(*project)) return false;
+    }
   }
-  for (const auto& project : m_workspace.projects) {
-    if (!ProcessProject(*project)) return false;
-  }
-  if (m_settings.mode == RunMode::Gen) GenerateWorkspace();
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
@@ -156,32 +164,51 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   return true;
 }
 
+// Builds or cleans.
 bool WorkspaceRun::ProcessProject(Project& project) {
-  MakeDirectories(project);
-  const std::string marker = PathJoin(project.rootDir, kMarkerFile);
-  if (!m_prepared.contains(marker) &&
-      CopyIfNewer(marker, m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false)) {
-    m_prepared.insert(marker);
-  }
-  if (m_settings.mode == RunMode::Gen) {
-    project.CollectFiles();
-    if (!project.exported) CreateMissingFiles(project);
-    GenerateProjectFile(project, false);
-  }
+  Prepare(project);
   if (m_settings.mode != RunMode::Clean) {
     if (!project.exported) WriteExportedProject(project);
     if (m_settings.mode == RunMode::Build) Repackage(project);
   }
-  if (project.usesQrex) {
-    m_anyTranslated = true;
-    if (!ProcessTranslated(project)) return false;
-  }
+  const bool isTranslated = project.usesQrex && (!project.exported || IsLibrary(project.targetType));
+  if (isTranslated && !BuildProject(project)) return false;
   if (!project.exported && m_settings.exportPublicHeaders && m_settings.mode == RunMode::Build) {
     ProjectConfig* config = FindProjectConfig(project);
     if (!config) return false;
     ExportPublicHeaders(project, *config);
   }
   return true;
+}
+
+void WorkspaceRun::GenerateProjects() {
+  const auto& projects = m_workspace.projects;
+  std::unordered_set<std::string_view> names;
+  for (const auto& project : projects) names.insert(project->name);
+  if (names.size() == projects.size()) {
+    ForEachInParallel(projects.size(), [&](size_t i) { GenerateProject(*projects[i]); });
+  } else {  // of the projects with one name the last one's files stay
+    for (const auto& project : projects) GenerateProject(*project);
+  }
+}
+
+void WorkspaceRun::GenerateProject(Project& project) {
+  Prepare(project);
+  project.CollectFiles();
+  if (!project.exported) CreateMissingFiles(project);
+  GenerateProjectFile(project, false);
+  if (!project.exported) WriteExportedProject(project);
+  if (project.usesQrex) GenerateProjectFile(project, true);
+}
+
+void WorkspaceRun::Prepare(const Project& project) {
+  const std::lock_guard lock(m_preparing);
+  MakeDirectories(project);
+  const std::string marker = PathJoin(project.rootDir, kMarkerFile);
+  if (!m_prepared.contains(marker) &&
+      CopyIfNewer(marker, m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false)) {
+    m_prepared.insert(marker);
+  }
 }
 
 void WorkspaceRun::MakeDirectories(const Project& project) {
@@ -218,15 +245,6 @@ void WorkspaceRun::Repackage(const Project& project) const {
   const std::string target = m_settings.platform + "/" + m_settings.config + "/" + project.name + "." +
                              std::string(TargetTypeExtension(project.targetType));
   CopyIfNewer(PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
-}
-
-bool WorkspaceRun::ProcessTranslated(Project& project) {
-  if (m_settings.mode == RunMode::Gen) {
-    GenerateProjectFile(project, true);
-    return true;
-  }
-  if (project.exported && !IsLibrary(project.targetType)) return true;
-  return BuildProject(project);
 }
 
 ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
@@ -279,7 +297,7 @@ void WorkspaceRun::GenerateWorkspace() {
     ApplyEnvironment(m_settings.platformEnvironments.begin()->second);
   }
   GenerateWorkspaceFile(m_workspace, false);
-  if (m_anyTranslated) GenerateWorkspaceFile(m_workspace, true);
+  if (AnyProjectUsesQrex(m_workspace)) GenerateWorkspaceFile(m_workspace, true);
 }
 
 // --- One file

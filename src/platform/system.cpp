@@ -211,9 +211,14 @@ void RunOnStack(size_t bytes, const std::function<void()>& body) {
 }
 
 void TuneHeap() {
-  constexpr int kStep = 16 << 20;
+  constexpr int kFirstStep = 256 << 20, kStep = 16 << 20;
+  constexpr size_t kBeyondWhatIsThere = 127 << 10;  // and not so much that it gets a mapping of its own
+  mallopt(M_TRIM_THRESHOLD, 4 * kFirstStep - 1);
+  mallopt(M_TOP_PAD, kFirstStep);
+  void* volatile begin = std::malloc(kBeyondWhatIsThere);  // volatile: the compiler would leave out the pair of calls
+  if (begin) PreferLargePages(begin, kFirstStep);
+  std::free(begin);
   mallopt(M_TOP_PAD, kStep);
-  mallopt(M_TRIM_THRESHOLD, 4 * kStep);
 }
 
 }  // namespace qrex::platform

@@ -4,13 +4,14 @@
 #include <boost/crc.hpp>
 #include <cstring>
 #include <future>
-#include <thread>
+#include <mutex>
 
 #include "platform/console.h"
 #include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
 #include "text/numbers.h"
+#include "text/parallel.h"
 
 namespace qrex {
 
@@ -127,8 +128,7 @@ std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths) {
     FileTimes times;
     for (size_t i = begin; i < end; ++i) found[i] = times.LastWriteTime(paths[i]);
   };
-  const size_t threads =
-      std::clamp<size_t>(paths.size() / kFewestOfThread, 1, std::max(1u, std::thread::hardware_concurrency()));
+  const size_t threads = UsefulThreads(paths.size(), kFewestOfThread);
   std::vector<std::future<void>> others;
   for (size_t i = 1; i < threads; ++i) {
     others.push_back(std::async(read, paths.size() * i / threads, paths.size() * (i + 1) / threads));
@@ -205,9 +205,10 @@ bool IsLeftover(std::string_view name) {
 }  // namespace
 
 std::string BesidePath(const std::string& path) {
+  static std::mutex lock;
   static std::unordered_set<std::string> sweptFolders;
   const std::string folder = path.substr(0, path.rfind('/') + 1);
-  if (sweptFolders.insert(folder).second) {
+  if (std::lock_guard guard(lock); sweptFolders.insert(folder).second) {
     for (const std::string& name : platform::PlainFileNames(folder)) {
       if (IsLeftover(name)) platform::RemoveFile(folder + name);
     }

@@ -32,11 +32,9 @@ std::string ProjectPathOf(const std::string& entry) {
 Workspace::Workspace(ConfigSettings& settings) : settings(settings), context(settings.context) {}
 
 Project* Workspace::FindProjectByName(std::string_view projectName) const {
-  if (const auto known = m_found.find(projectName); known != m_found.end()) return known->second;
+  if (const auto known = m_byName.find(projectName); known != m_byName.end()) return known->second;
   for (const auto& project : projects) {
-    if (project->name != projectName) continue;
-    if (!projectName.empty()) m_found.emplace(project->name, project.get());  // one without a name may get it yet
-    return project.get();
+    if (project->name == projectName) return project.get();
   }
   return nullptr;
 }
@@ -54,7 +52,9 @@ Project* Workspace::LoadProject(const std::string& path) {
   projects.push_back(std::make_unique<Project>(*this));
   Project& project = *projects.back();
   project.rootFolder.name = stem;
-  if (!LoadProjectFile(project, path)) return nullptr;
+  const bool isRead = LoadProjectFile(project, path);
+  m_byName.emplace(project.name, &project);
+  if (!isRead) return nullptr;
   if (m_loadDepth >= kMaxLoadDepth) {
     TraceWriter() << "Error: Subprojects nested too deeply at " << path << "\n";
     return nullptr;
@@ -121,7 +121,8 @@ void Workspace::SortProjects() {
   std::vector<std::unique_ptr<Project>> sorted;
   for (size_t index : sorter.Order()) sorted.push_back(std::move(projects[index]));
   projects = std::move(sorted);
-  m_found.clear();
+  m_byName.clear();
+  for (const auto& project : projects) m_byName.emplace(project->name, project.get());
 }
 
 // --- Identifiers: count, then per name in byte order its length, its bytes, 16 bytes of identifier.

@@ -19,7 +19,7 @@ class Workspace {
   void SortProjects();                            // subprojects first; ties keep the load order
   void SyncProjectGuids();                        // reads, applies and writes projects.guids
   bool CheckFileReferences();
-  Project* FindProjectByName(std::string_view name) const;  // or null
+  Project* FindProjectByName(std::string_view name) const;  // or null; several threads may look
   Project* FindSubproject(std::string_view path) const;     // by the path's stem; or null
   ProjectFile* FindFile(const std::string& path) const;     // by ProjectFile::path, after CheckFileReferences; or null
 
@@ -34,7 +34,7 @@ class Workspace {
  private:
   static constexpr int kMaxLoadDepth = 1000;
   int m_loadDepth = 0;
-  mutable std::unordered_map<std::string_view, Project*> m_found;  // by name: the first of each that was looked for
+  std::unordered_map<std::string_view, Project*> m_byName;  // the first of each name among those that are loaded
 };
 
 // A project entry without the extension qrpj stands for entry/src/last.qrpj.

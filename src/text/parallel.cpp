@@ -1,0 +1,85 @@
+#include "text/parallel.h"
+
+#include <algorithm>
+#include <atomic>
+#include <exception>
+#include <future>
+#include <thread>
+#include <vector>
+
+#include "text/trace.h"
+
+namespace qrex {
+
+namespace {
+
+struct Item {
+  HeldOutput output;
+  std::exception_ptr failure;
+  std::atomic<bool> isDone = false;
+};
+
+class ParallelLoop {
+ public:
+  ParallelLoop(size_t count, const std::function<void(size_t)>& work) : m_items(count), m_work(work) {}
+
+  // False when there is no item left.
+  bool RunNext() {
+    const size_t index = m_next++;
+    if (index >= m_items.size() || m_hasFailed) return false;
+    Item& item = m_items[index];
+    try {
+      HeldOutput::Scope hold(item.output);
+      m_work(index);
+    } catch (...) {
+      item.failure = std::current_exception();
+      m_hasFailed = true;
+    }
+    item.isDone = true;
+    return true;
+  }
+
+  // Of the items done so far, as long as none is missing before them. By one thread only.
+  void WriteOutput() {
+    for (; m_written < m_items.size() && m_items[m_written].isDone && !m_failure; ++m_written) {
+      m_items[m_written].output.Write();
+      m_failure = m_items[m_written].failure;
+    }
+  }
+
+  void RaiseFailure() const {
+    if (m_failure) std::rethrow_exception(m_failure);
+  }
+
+ private:
+  std::vector<Item> m_items;
+  const std::function<void(size_t)>& m_work;
+  std::atomic<size_t> m_next = 0;
+  std::atomic<bool> m_hasFailed = false;
+  size_t m_written = 0;
+  std::exception_ptr m_failure;
+};
+
+}  // namespace
+
+size_t UsefulThreads(size_t work, size_t leastOfThread) {
+  return std::clamp<size_t>(work / leastOfThread, 1, std::max(1u, std::thread::hardware_concurrency()));
+}
+
+void ForEachInParallel(size_t count, const std::function<void(size_t)>& work) {
+  constexpr size_t kFewestOfThread = 4;
+  ParallelLoop loop(count, work);
+  std::vector<std::future<void>> others;
+  for (size_t i = UsefulThreads(count, kFewestOfThread); i > 1; --i) {
+    others.push_back(std::async([&loop] {
+      while (loop.RunNext()) {
+      }
+    }));
+  }
+  while (loop.RunNext()) loop.WriteOutput();
+  for (std::future<void>& other : others) other.get();
+  loop.WriteOutput();
+  loop.RaiseFailure();
+}
+
+}  // namespace qrex
