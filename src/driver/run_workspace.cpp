@@ -1,9 +1,11 @@
 #include "driver/run_workspace.h"
 
-#include <mutex>
+#include <algorithm>
+#include <memory>
 #include <string>
 #include <string_view>
 #include <unordered_set>
+#include <vector>
 
 #include "build/project_builder.h"
 #include "generators/common.h"
@@ -52,7 +54,6 @@ class WorkspaceRun {
   Workspace m_workspace;
   int64_t m_errors = 0;
   int64_t m_warnings = 0;
-  std::mutex m_preparing;
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
 };
 
@@ -181,19 +182,27 @@ bool WorkspaceRun::ProcessProject(Project& project) {
   return true;
 }
 
+// Whether no project writes a file of another: none has its name, nor its name with the prefix.
+bool WriteFilesOfTheirOwn(const std::vector<std::unique_ptr<Project>>& projects) {
+  std::unordered_set<std::string> names;
+  auto isNew = [&names](const std::string& name) { return names.insert(name).second; };
+  return std::all_of(projects.begin(), projects.end(), [&](const std::unique_ptr<Project>& project) {
+    return isNew(project->name) && (!project->usesQrex || isNew(std::string(NamePrefix(true)) + project->name));
+  });
+}
+
 void WorkspaceRun::GenerateProjects() {
   const auto& projects = m_workspace.projects;
-  std::unordered_set<std::string_view> names;
-  for (const auto& project : projects) names.insert(project->name);
-  if (names.size() == projects.size()) {
-    ForEachInParallel(projects.size(), [&](size_t i) { GenerateProject(*projects[i]); });
-  } else {  // of the projects with one name the last one's files stay
-    for (const auto& project : projects) GenerateProject(*project);
+  auto prepare = [&](size_t i) { Prepare(*projects[i]); };
+  auto generate = [&](size_t i) { GenerateProject(*projects[i]); };
+  if (WriteFilesOfTheirOwn(projects)) return ForEachInParallel(projects.size(), prepare, generate);
+  for (size_t i = 0; i < projects.size(); ++i) {  // the last one's files stay
+    prepare(i);
+    generate(i);
   }
 }
 
 void WorkspaceRun::GenerateProject(Project& project) {
-  Prepare(project);
   project.CollectFiles();
   if (!project.exported) CreateMissingFiles(project);
   GenerateProjectFile(project, false);
@@ -202,7 +211,6 @@ void WorkspaceRun::GenerateProject(Project& project) {
 }
 
 void WorkspaceRun::Prepare(const Project& project) {
-  const std::lock_guard lock(m_preparing);
   MakeDirectories(project);
   const std::string marker = PathJoin(project.rootDir, kMarkerFile);
   if (!m_prepared.contains(marker) &&

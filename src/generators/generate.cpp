@@ -21,11 +21,17 @@ namespace {
 // Of the project or workspace at hand on this thread. The gcc family has one form of its files, so that the pass with
 // the prefix would compose and compare them once more.
 thread_local std::unordered_set<std::string> upToDate;
+thread_local bool isSecondPass = false;
+
+void BeginPass(bool buildPrefix) {
+  isSecondPass = buildPrefix;
+  if (!buildPrefix) upToDate.clear();
+}
 
 // Composes one file in memory and hands it over.
 template <typename... Args>
 void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args) {
-  if (upToDate.contains(path)) {
+  if (isSecondPass && upToDate.contains(path)) {
     TraceWriter() << "Skipping " << path << "\n";
     return;
   }
@@ -61,7 +67,7 @@ void GenerateGccWorkspace(const Workspace& workspace) {
 }  // namespace
 
 void GenerateProjectFile(Project& project, bool buildPrefix) {
-  if (!buildPrefix) upToDate.clear();
+  BeginPass(buildPrefix);
   const CompilerKind compiler = project.settings->compiler;
   if (IsGccFamily(compiler)) return GenerateGccProject(project);
   const std::string stem = std::string(NamePrefix(buildPrefix)) + project.name;
@@ -76,7 +82,7 @@ void GenerateProjectFile(Project& project, bool buildPrefix) {
 }
 
 void GenerateWorkspaceFile(Workspace& workspace, bool buildPrefix) {
-  if (!buildPrefix) upToDate.clear();
+  BeginPass(buildPrefix);
   const CompilerKind compiler = workspace.settings.compiler;
   if (IsGccFamily(compiler)) return GenerateGccWorkspace(workspace);
   const std::string stem = std::string(NamePrefix(buildPrefix)) + workspace.name;

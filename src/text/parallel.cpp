@@ -4,6 +4,7 @@
 #include <atomic>
 #include <exception>
 #include <future>
+#include <mutex>
 #include <thread>
 #include <vector>
 
@@ -21,15 +22,19 @@ struct Item {
 
 class ParallelLoop {
  public:
-  ParallelLoop(size_t count, const std::function<void(size_t)>& work) : m_items(count), m_work(work) {}
+  ParallelLoop(size_t count, const IndexedWork& begin, const IndexedWork& work)
+      : m_items(count), m_begin(begin), m_work(work) {}
 
   // False when there is no item left.
   bool RunNext() {
+    std::unique_lock lock(m_lock);
+    if (m_next == m_items.size() || m_hasFailed) return false;
     const size_t index = m_next++;
-    if (index >= m_items.size() || m_hasFailed) return false;
     Item& item = m_items[index];
     try {
       HeldOutput::Scope hold(item.output);
+      m_begin(index);
+      lock.unlock();
       m_work(index);
     } catch (...) {
       item.failure = std::current_exception();
@@ -53,8 +58,10 @@ class ParallelLoop {
 
  private:
   std::vector<Item> m_items;
-  const std::function<void(size_t)>& m_work;
-  std::atomic<size_t> m_next = 0;
+  const IndexedWork& m_begin;
+  const IndexedWork& m_work;
+  std::mutex m_lock;  // of m_next, and so of the order in which items begin
+  size_t m_next = 0;
   std::atomic<bool> m_hasFailed = false;
   size_t m_written = 0;
   std::exception_ptr m_failure;
@@ -66,9 +73,9 @@ size_t UsefulThreads(size_t work, size_t leastOfThread) {
   return std::clamp<size_t>(work / leastOfThread, 1, std::max(1u, std::thread::hardware_concurrency()));
 }
 
-void ForEachInParallel(size_t count, const std::function<void(size_t)>& work) {
+void ForEachInParallel(size_t count, const IndexedWork& begin, const IndexedWork& work) {
   constexpr size_t kFewestOfThread = 4;
-  ParallelLoop loop(count, work);
+  ParallelLoop loop(count, begin, work);
   std::vector<std::future<void>> others;
   for (size_t i = UsefulThreads(count, kFewestOfThread); i > 1; --i) {
     others.push_back(std::async([&loop] {

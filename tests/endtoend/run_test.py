@@ -241,6 +241,26 @@ def test_gen_twice():
     holds(run('main.qrex', 'mode=gen'), 'Creating missing file tree/app/no/such.h\nError creating tree/app/no/such.h\n')
 
 
+def test_projects_that_write_the_same_files():
+    # the last one's stay, as if the projects came one after the other; of the markers that of the first root stays
+    names = [f'{prefix}{i}' for i in range(6) for prefix in ('p', 'build_p')]
+    projects = {('over' if 'b' in name else 'tree') + f'/{name}/src/{name}.qrpj':
+                f'$TARGET_TYPE = "Application" $ROOT_TO_PROJDIR = "{name}" qrex toolfiles {{ "of_{name}" }} {{ }}'
+                for name in names}
+    for _ in range(4):
+        write_tree({**projects, 'tree/ws/all.qrws': '"all" { "' + '" "'.join(names) + '" }\n', 'over/.qrwsroot': 'over'})
+        text = run('main.qrex', 'mode=gen', 'compiler=vc9', 'virtualTree += { "over" }')
+        expect(re.findall(r'Writing (.*)\.vcproj', text) == [of for name in names for of in (name, 'build_' + name)], text)
+        for i in range(6):
+            holds(read(f'build_p{i}.vcproj').decode(), f'"of_build_p{i}"')
+        expect(read('out/uinc/.qrwsroot') == b'', 'marker')
+        for path in ['out', *(path for path in os.listdir('.') if path.endswith('.vcproj'))]:
+            shutil.rmtree(path) if os.path.isdir(path) else os.remove(path)
+    write_tree({'tree/app/src/app.qrpj': HEAD + 'config { "D|x" } +cpp { -one } config { "D|x" } { }'})
+    expect(run('main.qrex', 'mode=gen').count('Writing make_app_x_D\n') == 2, 'a configuration that is there twice')
+    holds(read('make_app_x_D').decode(), 'CXXFLAGS = \r\n')
+
+
 def test_repackaged_program_stays_executable():
     write_tree({'tree/app/src/app.qrpj': '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nexport\n'
                                          'config { "Debug|x64" }\n{ }\n', 'tree/x64/Debug/app.exe': '#!/bin/sh\n'})

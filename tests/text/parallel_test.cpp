@@ -23,33 +23,40 @@ class ParallelTest : public testing::Test, public TraceHook {
   std::string m_trace;
 };
 
-// The earlier ones take longest, and each prints twice.
+// The earlier ones take longest, and each prints twice. They begin in order.
 TEST_F(ParallelTest, OutputKeepsItsOrder) {
   constexpr size_t kCount = 20;
   std::string expected;
   for (size_t i = 0; i < kCount; ++i) expected += std::to_string(i) + "a " + std::to_string(i) + "b ";
+  size_t begun = 0;
   std::atomic<size_t> calls = 0;
-  ForEachInParallel(kCount, [&](size_t i) {
+  auto begin = [&](size_t i) {
+    EXPECT_EQ(begun++, i);
     TraceWriter() << i << "a ";
+  };
+  auto work = [&](size_t i) {
     std::this_thread::sleep_for(std::chrono::microseconds(200 * (kCount - i)));
     TraceWriter() << i << "b ";
     ++calls;
-  });
+  };
+  ForEachInParallel(kCount, begin, work);
   EXPECT_EQ(kCount, calls);
   EXPECT_EQ(expected, m_trace);
   TraceWriter() << "behind";
   EXPECT_EQ(expected + "behind", m_trace);
-  ForEachInParallel(0, [](size_t) { FAIL(); });
+  ForEachInParallel(0, begin, work);
+  EXPECT_EQ(kCount, calls);
 }
 
 TEST_F(ParallelTest, FirstFailureIsRaised) {
   std::atomic<size_t> calls = 0;
   try {
-    ForEachInParallel(1000, [&](size_t i) {
+    auto begin = [](size_t i) { TraceWriter() << i << " "; };
+    auto work = [&](size_t i) {
       ++calls;
-      TraceWriter() << i << " ";
       if (i >= 3) throw FileException(2, std::to_string(i));
-    });
+    };
+    ForEachInParallel(1000, begin, work);
     FAIL();
   } catch (const FileException& exception) {
     EXPECT_EQ("3", exception.path);
