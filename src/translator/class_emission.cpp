@@ -169,7 +169,7 @@ void WriteAdtFunction(TextWriter& out, const ClassDef& def, const FunctionSignat
   PrintType(out, method.returnType);
   out << " __stdcall " << method.name << "(";
   WriteSelfAndArgDeclarations(out, def.name, method);
-  out << ");\n";
+  out << ");";
 }
 
 }  // namespace

@@ -105,9 +105,9 @@ bool QrexParser::ParseDecoratorType(TypeCode& type, bool reflected) {
 }
 
 bool QrexParser::ParseBaseType(TypeCode& type, bool reflected) {
+  const char* const begin = current.text.begin;  // `typename` belongs to the text of a type that stays C++
   AcceptWord("typename");
   if (!Is(kIdentifier) && !Is(kColonColon)) return false;
-  const char* const begin = current.text.begin;
   NameSpace* scope = Accept(kColonColon) ? &Root() : nullptr;
   NameSpaceElement* found = nullptr;
   for (bool isScoped = scope != nullptr;; isScoped = true) {

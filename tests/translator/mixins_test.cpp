@@ -79,9 +79,7 @@ app_API vesk::ReflectedClass const& _GetReflected(A const*);
 app_API vesk::TypeOps const& _GetTypeOps(A const*);
 
 app_API vesk::int32 __stdcall get(A const* _self,vesk::int32 i);
-
 app_API void __stdcall set(A* _self,vesk::string8 const& s);
-
 )" + TraitsText("A", "adt", "1111"));
   const std::string source = Translate("a.cpp", R"(@import "t.h"
 $adt+ implement A

@@ -110,6 +110,7 @@ TEST_F(TypesTest, UnreflectedTypesStayText) {
       {"unsigned*", "unsigned*"},
       {"std::vector< std::map<int,K>> const& x", "std::vector< std::map<int,K>> const&"},
       {"n::Unknown", "n::Unknown"},
+      {"const typename X::Inner* x", "typename X::Inner const*"},
       {"K<int>", "K<int>"},
       {"K", "K"},
       {"xvector<DWORD>", "vesk::xvector<DWORD>"},
