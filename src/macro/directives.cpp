@@ -216,7 +216,7 @@ void ExpansionContext::Import() {
   LexToken token;
   const std::string path = ReadStringOrExpression("import", wasExpression, token);
   if (wasExpression) {
-    FlushTo(m_here);
+    Settle();
     DropToScanner();
     EmitGenerated("@import \"" + path + "\"");
   }

@@ -173,7 +173,7 @@ TEST_F(DirectivesTest, Prints) {
 TEST_F(DirectivesTest, Imports) {
   files = {{"a", "@def f = 1\n@import \"b\"\n"}, {"b", "@def g = @where\n"}};
   EXPECT_EQ("  @import \"a\"\n1 here", Expand("  @import \"a\"\nf g"));
-  EXPECT_EQ(" @import \"a\"\n1", Expand(" @import (\"a\" + \"\")\nf"));
+  EXPECT_EQ("x@import \"a\"\n1", Expand("x @import (\"a\" + \"\")\nf"));
   EXPECT_EQ("\nx", Expand("  @importpath \"p/q\"@importpath (\"r\")\nx"));
   EXPECT_EQ("p/q;r;", importPaths);
   takesImportPaths = false;
