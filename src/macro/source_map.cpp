@@ -83,9 +83,11 @@ bool FindSourceLine(const SourceFileList& files, const char* position, std::stri
   if (!position) return false;
   for (const auto& file : files) {
     const TextRange text{std::string_view(file->text)};
-    if (!text.Contains(position)) continue;
+    // What is missing from an empty expansion has no source of its own: it is missing at the end of the file.
+    const bool isEmptyExpansion = file->expansion.empty() && position == file->expansion.data();
+    if (!isEmptyExpansion && !text.Contains(position)) continue;
     path = file->path;
-    line = LineOfPosition(text, position);
+    line = LineOfPosition(text, isEmptyExpansion ? text.end : position);
     return true;
   }
   return false;

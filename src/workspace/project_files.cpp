@@ -103,6 +103,8 @@ void ProjectParser::ParseSearch(ProjectFolder& folder, const std::string& direct
     Advance();
   }
   for (const std::string& root : m_project.settings->virtualTree) Find(search, root, folder, directory);
+  std::sort(search.matched.begin(), search.matched.end());  // two roots may hold one path
+  search.matched.erase(std::unique(search.matched.begin(), search.matched.end()), search.matched.end());
   if (current.kind == kColon) ParseFileOptions(search.matched);
 }
 

@@ -100,7 +100,7 @@ void ProjectParser::SetTargetType(const std::string& text) {
     }
     names += (i > 0 ? ",\"" : "\"") + std::string(TargetTypeName(type)) + "\"";
   }
-  throw LexScannerException("Only target types " + names + " supported", current);
+  throw LexScannerException("Only target types " + names + " supported", previous);
 }
 
 // --- Statements

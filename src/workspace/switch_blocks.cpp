@@ -50,6 +50,7 @@ class SwitchReader {
   int32_t Kind() const { return m_parser.current.kind; }
   std::string& Entry(std::string_view property) { return m_changes.entries[std::string(property)]; }
   [[noreturn]] void Fail(std::string message) const { throw LexScannerException(std::move(message), m_parser.current); }
+  [[noreturn]] void FailAtSwitch(std::string message) const { throw LexScannerException(std::move(message), m_switch); }
 
   void Require(int32_t kind, std::string_view message) {
     if (Kind() != kind) Fail(std::string(message) + Printed(m_parser.current));
@@ -64,28 +65,29 @@ class SwitchReader {
   }
 
   std::string ReadSwitchText();
-  void ReadColonPart(const char* begin, const char*& end);
+  void ReadColonPart(const char*& end);
   void ReadPrecompiledHeader(char which);
   void ReadDisabledWarning(const std::string& text);
 
   MpfwParser& m_parser;
   SwitchChanges& m_changes;
+  const char* m_switch = nullptr;  // the `/` of the switch at hand
 };
 
 // From the `/`, which is the current token, to the end of the word behind it; stands behind the word afterwards.
 std::string SwitchReader::ReadSwitchText() {
-  const char* const begin = m_parser.current.text.begin;
+  m_switch = m_parser.current.text.begin;
   m_parser.Advance();
   const char* end = m_parser.current.text.end;
   const bool mayHaveColon = std::find(std::begin(kWordsWithColon), std::end(kWordsWithColon),
                                       m_parser.current.text.View()) != std::end(kWordsWithColon);
   m_parser.Advance();
-  if (mayHaveColon && Kind() == kColon) ReadColonPart(begin, end);
-  return std::string(begin, end);
+  if (mayHaveColon && Kind() == kColon) ReadColonPart(end);
+  return std::string(m_switch, end);
 }
 
-void SwitchReader::ReadColonPart(const char* begin, const char*& end) {
-  const std::string soFar(begin, end);
+void SwitchReader::ReadColonPart(const char*& end) {
+  const std::string soFar(m_switch, end);
   m_parser.Advance();
   if (Kind() != kIdentifier) Fail("Expected identifier after " + soFar + " when read " + Printed(m_parser.current));
   end = m_parser.current.text.end;
@@ -117,9 +119,9 @@ bool SwitchReader::ReadCompilerSwitch() {
   } else if (text == "/wd") {
     ReadDisabledWarning(text);
   } else if (text == "/Gf") {
-    Fail("/Gf not supported, use /GF instead");
+    FailAtSwitch("/Gf not supported, use /GF instead");
   } else {
-    Fail("Invalid switch " + text);
+    FailAtSwitch("Invalid switch " + text);
   }
   return true;
 }
@@ -132,7 +134,7 @@ void SwitchReader::ReadPrecompiledHeader(char which) {
 }
 
 void SwitchReader::ReadDisabledWarning(const std::string& text) {
-  if (m_changes.isRemoval) Fail("Subtraction of " + text + " not supported");
+  if (m_changes.isRemoval) FailAtSwitch("Subtraction of " + text + " not supported");
   if (Kind() != kDecimal) Fail("Expected warning number after " + text + " when read " + Printed(m_parser.current));
   AppendItem(Entry("DisableSpecificWarnings"), ToString(DecimalValue64(m_parser.current)));
   m_parser.Advance();
@@ -140,9 +142,9 @@ void SwitchReader::ReadDisabledWarning(const std::string& text) {
 
 bool SwitchReader::ReadResourceSwitch() {
   if (Kind() != kSlash) return false;
-  const char* const begin = m_parser.current.text.begin;
+  m_switch = m_parser.current.text.begin;
   m_parser.Advance();
-  const std::string text(begin, m_parser.current.text.end);
+  const std::string text(m_switch, m_parser.current.text.end);
   m_parser.Advance();
   if (const auto* flag = FindSwitch(kResourceFlags, text)) {
     Entry(flag->property) = "true";
@@ -155,7 +157,7 @@ bool SwitchReader::ReadResourceSwitch() {
     Entry("Culture") = m_parser.current.text.Text();
     m_parser.Advance();
   } else {
-    Fail("Invalid resource compiler switch " + text);
+    FailAtSwitch("Invalid resource compiler switch " + text);
   }
   return true;
 }

@@ -225,15 +225,20 @@ TEST_F(ProjectTest, OptionsOfFiles) {
   EXPECT_EQ("Debug|x64://PreprocessorDefinitions=M_x64;\nRelease|x64://PreprocessorDefinitions=M_x64;\n",
             records(Load(std::string(kHeads) + kConfigs + "{ \"a.cpp\" : +cpp (\"x64\") { /D \"M_$(PLATFORM)\" } }"),
                     "app/a.cpp"));
+  Write("tree/app/two.c", "");
+  Write("more/app/two.c", "");
+  EXPECT_EQ("Release|x64://AdditionalOptions=/MP;\n",
+            records(Load(std::string(kHeads) + kConfigs + "{ \"*.c\" : +cpp (\"Release\") { /MP } }"), "app/two.c"));
 }
 
 TEST_F(ProjectTest, Messages) {
   for (const auto& [text, message] : std::initializer_list<std::pair<std::string, std::string>>{
+           {"", "(1) : Expected '$' when read EOS"},
            {"$TARGET", "(1) : Expected 'TARGET_TYPE' when read TARGET"},
            {"$TARGET_TYPE \"x\"", "(1) : Expected = after TARGET_TYPE when read \"x\""},
            {"$TARGET_TYPE = 'x'", "(1) : Expected quoted string when read 'x'"},
            {"$TARGET_TYPE = \"x\"\n$",
-            "(2) : Only target types \"Application\",\"Static Library\",\"Console Application\",\"Dynamic-Link "
+            "(1) : Only target types \"Application\",\"Static Library\",\"Console Application\",\"Dynamic-Link "
             "Library\",\"Utility Project\" supported"},
            {"$TARGET_TYPE = \"Library\"\nqrex", "(2) : Expected '$' when read qrex"},
            {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a\\\\b\"",
@@ -262,6 +267,7 @@ TEST_F(ProjectTest, Messages) {
            {"+ \"cpp\"", "(3) : Expected identifier when read \"cpp\""},
            {"+asm { }", "(3) : Expected 'cpp' or 'link' when read asm"},
            {"-asm { }", "(3) : Expected { when read -"},
+           {"-cpp {\n/frob\n}", "(4) : Invalid switch /frob"},
            {"-1", "(3) : Expected identifier when read 1"},
            {"+link x", "(3) : Expected { when read x"},
            {"+link { -a", "(3) : Unexpected end of file"},
