@@ -159,7 +159,11 @@ void ExpansionContext::Print(bool endLine) {
   DropToScanner();
   std::string text = ExpandPart(raw);
   if (endLine) text += '\n';
-  WriteToConsole(text);
+  try {
+    WriteToConsole(text);
+  } catch (const StringConversionException& exception) {
+    throw LexScannerException(ExceptionText(exception), m_tokenText);
+  }
 }
 
 void ExpansionContext::Assert() {
