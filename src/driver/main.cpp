@@ -15,6 +15,7 @@ constexpr size_t kStackSize = size_t{1} << 30;
 int main(int argc, char** argv) {
   const std::vector<std::string> arguments(argv, argv + argc);
   int status = 1;
+  qrex::platform::FillStandardHandles();
   qrex::platform::TuneHeap();
   qrex::platform::BufferStdout();
   qrex::platform::RunOnStack(kStackSize, [&] { status = qrex::RunCommandLine(arguments); });

@@ -1,5 +1,7 @@
 #include "platform/console.h"
 
+#include <fcntl.h>
+#include <poll.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -59,6 +61,14 @@ std::string WidenBytes(std::string_view text) {
   return widened;
 }
 
+void FillStandardHandles() {
+  int number;
+  do {
+    number = open("/dev/null", O_RDWR);
+  } while (number >= 0 && number <= STDERR_FILENO);
+  if (number >= 0) close(number);
+}
+
 bool StdoutIsTerminal() { return isatty(STDOUT_FILENO) != 0; }
 
 namespace {
@@ -74,8 +84,11 @@ Clock::time_point lastWrite;
 void WriteAtOnce(std::string_view bytes) {
   while (!bytes.empty()) {
     const ssize_t written = write(STDOUT_FILENO, bytes.data(), bytes.size());
-    if (written < 0 && errno != EINTR) return;
     if (written > 0) bytes.remove_prefix(static_cast<size_t>(written));
+    if (written >= 0 || errno == EINTR) continue;
+    if (errno != EAGAIN) return;
+    pollfd output{STDOUT_FILENO, POLLOUT, 0};  // a pipe that does not block, and is full
+    poll(&output, 1, -1);
   }
 }
 

@@ -497,6 +497,26 @@ def test_what_is_in_the_way():
     holds(run(), '\n...Copy file failed\n', '\nCompleted')
 
 
+def test_standard_output_that_takes_nothing():
+    write_tree({'tree/app/c.h': 'int c;\n' * 200000})
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    shutil.rmtree('qrexsource')
+    shutil.rmtree('out')
+    expect(subprocess.run(f'"{BINARY}" main.qrex diagnostics=true >&-', shell=True).returncode == 0, 'closed')
+    expect(without_times(contents('qrexsource', 'out')) == wanted, 'what was printed stands in a file')
+    # a pipe that is full for a while and does not block
+    reading, writing = os.pipe()
+    os.set_blocking(writing, False)
+    os.write(writing, b'.' * 60000)
+    process = subprocess.Popen([BINARY, *['a="' + 'x' * 999 + '"'] * 60, 'main.qrex', 'mode=clean'], stdout=writing)
+    os.close(writing)
+    time.sleep(0.2)
+    with os.fdopen(reading) as pipe:
+        holds(pipe.read(), 'argv[60] = ', '\nCompleted')
+    expect(process.wait() == 0, 'status')
+
+
 def test_full_disk():
     write_tree({'tree/app/c.h': 'int c;\n' * 1000})
     text = run(status=1, limit=4096)
