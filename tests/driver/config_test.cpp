@@ -38,16 +38,6 @@ class ConfigTest : public WorkspaceTest {
   std::unique_ptr<ConfigSettings> m_settings;
 };
 
-TEST_F(ConfigTest, Defaults) {
-  Load("");
-  EXPECT_EQ(RunMode::Build, Got().mode);
-  EXPECT_EQ(CompilerKind::vc8, Got().compiler);
-  EXPECT_TRUE(Got().defaultToDll && Got().writeTokenEquivalent && Got().exportPublicHeaders);
-  EXPECT_TRUE(Got().repackageExecutableTargets && Got().solutionContainsPrepackagedProjects);
-  EXPECT_TRUE(Got().makeTranslatedFilesReadOnly && Got().makeExportedHeaderFilesReadOnly);
-  EXPECT_FALSE(Got().diagnostics || Got().targetXP || Got().translateOnly || Got().rebuildAll);
-}
-
 TEST_F(ConfigTest, Keys) {
   Load(
       "virtualTree = { \"a\" ('b' + \"c\") } virtualTree += { 'd' }\n"
@@ -70,13 +60,6 @@ TEST_F(ConfigTest, Keys) {
   EXPECT_FALSE(Got().defaultToDll || Got().exportPublicHeaders || Got().repackageExecutableTargets);
   EXPECT_FALSE(Got().solutionContainsPrepackagedProjects || Got().makeTranslatedFilesReadOnly);
   EXPECT_FALSE(Got().makeExportedHeaderFilesReadOnly || Got().writeTokenEquivalent);
-}
-
-TEST_F(ConfigTest, CompilerWords) {
-  for (const char* word : {"vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"}) {
-    Load(std::string("compiler = ") + word);
-    EXPECT_EQ(word, CompilerKeyword(Got().compiler));
-  }
 }
 
 TEST_F(ConfigTest, Variables) {

@@ -222,16 +222,10 @@ def test_clean_compile_show():
     lacks(run('main.qrex', 'mode=clean'), 'Deleting')
 
 
-def test_gen_twice():
+def test_missing_files_are_made():
     write_tree({'tree/app/c.h': None})
-    for compiler in ['gcc', 'vc6', 'vc9', 'vc14']:
-        text = run('main.qrex', 'mode=gen', 'compiler=' + compiler)
-        holds(text, 'Generating workspace [ws/all.qrws]\n', 'all.projects\n')
-        before = times('.')
-        text = run('main.qrex', 'mode=gen', 'compiler=' + compiler)
-        lacks(text, 'Writing ')
-        lacks(text, 'Creating')
-        expect(set(changed(before, times('.'))) <= EACH_RUN, changed(before, times('.')))
+    holds(run('main.qrex', 'mode=gen'), 'Generating workspace [ws/all.qrws]\n', 'Creating missing file tree/app/c.h\n')
+    lacks(run('main.qrex', 'mode=gen'), 'Creating')
     expect(read('tree/app/c.h') == b'', 'the missing file')
     os.rename('tree/app', 'tree/was')
     write('tree/app/src/app.qrpj', read('tree/was/src/app.qrpj'))
@@ -306,22 +300,10 @@ BAD_INPUT = [
     # changes to the tree, then what the output holds, in order
     ({'main.qrex': JUNK}, ['main.qrex(1) : ', '    while processing qrex config file : main.qrex\n']),
     ({'main.qrex': CONFIG + '\n\nmoed = build'}, ['\nmain.qrex(15) : Syntax error: moed\n']),
-    ({'main.qrex': CONFIG + 'mode = bild'}, ['\nmain.qrex(13) : Invalid option : bild\n']),
-    ({'main.qrex': CONFIG + 'diagnostics = yes'}, ['\nmain.qrex(13) : Expected false/true after = when read yes\n']),
-    ({'main.qrex': CONFIG + 'workspaces += { "a"'}, ['\nmain.qrex(13) : Expected quoted string when read EOS\n']),
-    ({'main.qrex': CONFIG + '@import "none.inc"'}, ['\nmain.qrex(13) : Couldn\'t open file none.inc']),
-    ({'main.qrex': CONFIG + '@import "a.inc"', 'a.inc': '\nmoed'},
-     ['\na.inc(2) : Syntax error: moed\n', '\nmain.qrex(13) : while processing @import of a.inc\n']),
     ({'main.qrex': CONFIG + '@import "main.qrex"'}, ['main.qrex(13) : Imports nested too deeply\n']),
     ({'tree/ws/all.qrws': None}, ['\nError: Couldn\'t open workspace file ws/all.qrws\n']),
     ({'tree/ws/all.qrws': None, 'tree/ws/all.qrws/x': ''}, ['\nError: Couldn\'t open workspace file ws/all.qrws\n']),
     ({'tree/ws/all.qrws': JUNK}, ['tree/ws/all.qrws(1) : ', '\nError in workspace file tree/ws/all.qrws\n']),
-    ({'tree/ws/all.qrws': '"all" { "app"'}, ['\ntree/ws/all.qrws(1) : Expected double quoted string when read EOS\n']),
-    ({'tree/ws/all.qrws': '"all"\n{\n"none.qrws"\n}'},
-     ['\ntree/ws/all.qrws(3) : Couldn\'t open workspace file none.qrws\n']),
-    ({'tree/ws/all.qrws': '"all"\n{\n"none" { }\n}'},
-     ['Error: Couldn\'t open project file none/src/none.qrpj\n',
-      '\ntree/ws/all.qrws(3) : while reading project file none/src/none.qrpj\n']),
     ({'tree/ws/all.qrws': '"all" {\n"ws/b.qrws" }', 'tree/ws/b.qrws': '"b" {\n\n"ws/all.qrws" }'},
      ['\ntree/ws/b.qrws(3) : Workspace file includes itself : ws/all.qrws\n',
       '\ntree/ws/all.qrws(2) : while reading workspace file ws/b.qrws\n']),
@@ -331,8 +313,6 @@ BAD_INPUT = [
     ({'tree/app/src/app.qrpj': JUNK}, ['tree/app/src/app.qrpj(1) : ', 'while reading project file app/src/app.qrpj\n']),
     ({'tree/app/src/app.qrpj': HEAD + '\n{ "a.h"'},
      ['\ntree/app/src/app.qrpj(4) : Expected quoted string when read EOS\n']),
-    ({'tree/app/src/app.qrpj': HEAD + 'config\n{\n"Debug"\n}\n{ }'},
-     ['\ntree/app/src/app.qrpj(5) : Config specifier "Debug" must be of the form name|platform\n']),
     ({'tree/app/src/app.qrpj': HEAD + '{ ' + '"a" { ' * 3000}, [' : Blocks nested too deeply\n']),
     ({'tree/app/src/app.qrpj': PROJECT + 'subproj { "base" }\n{ }'},
      ['Error: Couldn\'t open project file base/src/base.qrpj\n', 'while reading project file app/src/app.qrpj\n']),
@@ -420,14 +400,11 @@ def test_identifier_file():
     write('projects.guids', b'\x02\x03app' + old + b'\x04gone' + old)
     run()
     expect(read('projects.guids') == b'\x02\x03app' + old + b'\x04gone' + old, read('projects.guids'))
-    for content in [b'\x02\x03app' + old, b'\x01\x03ap', b'\xff', b'\x7f' + JUNK, b'\x01\x03app' + old[:15]]:
-        write('projects.guids', content)
-        text = run()
-        holds(text, 'Error reading projects.guids : Deserialisation error\n', '\nCompleted')
-        made = read('projects.guids')
-        expect(made[:5] == b'\x01\x03app' and len(made) == 21 and made[5:] != old, made)
-        run()
-        expect(read('projects.guids') == made, 'a stable identifier')
+    write('projects.guids', b'\x7f' + JUNK)
+    holds(run(), 'Error reading projects.guids : Deserialisation error\n', '\nCompleted')
+    made = read('projects.guids')
+    run()
+    expect(made[:5] == b'\x01\x03app' and len(made) == 21 and read('projects.guids') == made, made)
     os.remove('projects.guids')
     os.mkdir('projects.guids')
     holds(run(), "Error : Couldn't write projects.guids\n", '\nCompleted')
