@@ -35,7 +35,9 @@ bool ClassDef::HaveSomethingToRegister() const {
 
 void ClassDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
   NameSpace& root = *owner.rootNameSpace;
-  for (const ClassField& field : m_fields) CollectNamedTypes(field.type, root, out);
+  for (const ClassField& field : m_fields) {
+    if (field.reflected) CollectNamedTypes(field.type, root, out);
+  }
   for (const ModelField* field : m_modelFields) CollectNamedTypes(field->m_type, root, out);
   for (const FunctionSignature& method : m_methods) CollectNamedTypes(method, root, out);
 }

@@ -133,6 +133,7 @@ TEST_F(NameSpaceTest, Warnings) {
        "t.h(2) : warning W1002 : Reflected $struct+ B references non-registered $struct A\n"
        "t.h(1) : see declaration of $struct A\n"},
       {"$struct A; $struct+ R { }; $struct+ B { $A* a; $R r; }; $struct C <<reflect -reflect>> { $A* a; };", ""},
+      {"$struct A { }; $struct+ B { $indep -A a; };", ""},
       {"$interface I\n{ };\n$struct A isa I { };",
        "t.h(3) : warning W1003 : isa on $interface I doesn't inherit from IObject\n"
        "t.h(1) : see declaration of $interface I\n"
