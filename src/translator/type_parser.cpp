@@ -328,10 +328,9 @@ void QrexParser::ParseSignatureEnd(FunctionSignature& signature, bool constAllow
 void QrexParser::ParseFunctionSignature(FunctionSignature& signature, bool constAllowed, bool directionsRequired,
                                         bool polymorphicAllowed, bool reflected) {
   signature.isInline = AcceptWord("inline");
-  if (!ParseTypeWithName(signature.returnType, nullptr, false, nullptr, reflected)) {
-    Fail("Type expected when read " + Printed(current));
+  if (!ParseTypeWithName(signature.returnType, nullptr, false, nullptr, reflected) || !Is(kIdentifier)) {
+    Fail("Function name expected when read " + Printed(current));
   }
-  if (!Is(kIdentifier)) Fail("Function name expected when read " + Printed(current));
   signature.name = ReadIdentifier();
   Expect(kOpenParen, "(");
   ParseArguments(signature, directionsRequired, polymorphicAllowed, reflected);

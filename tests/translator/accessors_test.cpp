@@ -48,7 +48,6 @@ TEST_F(AccessorsTest, Paths) {
   const struct {
     const char *field, *name, *text;
   } kPaths[] = {
-      {"int32 x;", "x", ") { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=0; "},
       {"Inner a; Inner x;", "xy", ") { vesk::octet_t* p=_path.InitLocalBuffer(2); p[0]=1; p[1]=0; "},
       {"int32 x[128];", "xElement",
        ",vesk::ssize_t _k0) { vxAssert(0 <= _k0 && _k0 < 128); vesk::octet_t* p=_path.InitLocalBuffer(2); p[0]=0; "

@@ -192,7 +192,7 @@ TEST_F(TypesTest, Signatures) {
     parser.ParseFunctionSignature(ignored, false, false, false, true);
   };
   const Texts cases = {
-      {"1", "Type expected when read 1"},
+      {"1", "Function name expected when read 1"},
       {"int32 1", "Function name expected when read 1"},
       {"int32 f;", "Expected ( after f when read ;"},
       {"int32 f([E e])", "'[' unexpected.  Polymorphic argument not allowed here"},
