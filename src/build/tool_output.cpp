@@ -19,6 +19,8 @@ bool StripIgnoringCase(std::string& path, const std::string& prefix) {
   return true;
 }
 
+constexpr int64_t kLastLine = 1'000'000'000'000;  // no file is longer; further digits of a number are only passed over
+
 // A message in a line: where the file name ends, the number, and the text behind.
 struct Message {
   std::string_view file;
@@ -63,8 +65,9 @@ class OutputScanner {
     const bool isColonForm = opening == ':' && IsGccFamily(m_builder.settings.compiler);
     if (opening != '(' && !isColonForm) return false;
     size_t next = at + 1;
-    while (next < line.size() && IsDigit(line[next]) && next - at < 18)
-      message.line = message.line * 10 + (line[next++] - '0');
+    for (; next < line.size() && IsDigit(line[next]); ++next) {
+      if (message.line < kLastLine) message.line = message.line * 10 + (line[next] - '0');
+    }
     if (next == at + 1) return false;
     message.file = line.substr(begin, at - begin);
     auto skipBlanks = [&] {

@@ -317,7 +317,7 @@ TEST_F(ToolsTest, MessagesAreCounted) {
       {kVisual, "a(1) : error b(2) : error c(3) : warning", 2, 1},
       {kVisual, "a \"b(2) : error", 0, 0},
       {kVisual, "a*b(2) : error", 0, 0},
-      {kVisual, "a(99999999999999999999999) : error", 0, 0},
+      {kVisual, "a(99999999999999999999999) : error", 1, 0},
       {kVisual, "a(1) : error\n\n  \nb(2) : warning\n", 1, 1},
       {kVisual, "a.cpp:12:3: error: x", 0, 0},
       {kGcc, "a.cpp:12:3: error: x", 1, 0},
