@@ -4,12 +4,15 @@
 // for the superuser, whom the permission bits would not stop.
 #pragma once
 
+#include <cstddef>
 #include <cstdint>
 #include <string>
 #include <string_view>
 #include <vector>
 
 namespace qrex::platform {
+
+constexpr size_t kLongestName = 255;  // of a file, in bytes
 
 struct FileInfo {
   bool isDirectory = false;

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <boost/crc.hpp>
 #include <cstring>
+#include <functional>
 #include <future>
 #include <mutex>
 
@@ -213,7 +214,11 @@ std::string BesidePath(const std::string& path) {
       if (IsLeftover(name)) platform::RemoveFile(folder + name);
     }
   }
-  return path + std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
+  const std::string mark =
+      std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
+  const std::string name = path.substr(folder.size());
+  if (name.size() + mark.size() <= platform::kLongestName) return path + mark;
+  return folder + std::to_string(std::hash<std::string>()(name)) + mark;
 }
 
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly) {

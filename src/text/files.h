@@ -54,8 +54,8 @@ bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, w
 bool ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
 
-// The name of this process's own under which a file is written before it takes the place of `path`. The first call for
-// a folder removes what killed runs left there.
+// The name of this process's own under which a file is written before it takes the place of `path`; where that name
+// would be too long, a number stands for the file's. The first call for a folder removes what killed runs left there.
 std::string BesidePath(const std::string& path);
 // Replaces the file as a whole: written beside, then renamed, so that a half-written file never stands under `path`.
 // Raises FileException. A read-only target fails with code 5, unless the flag is the caller's own: it was cleared, but

@@ -38,6 +38,7 @@ TEST_F(OutputPolicyTest, WritesWhatDiffers) {
   EXPECT_EQ(1, WriteText("", "empty"));
   EXPECT_EQ(0, WriteText("", "empty"));
   EXPECT_EQ("Writing x\nSkipping x\nSkipping x\nWriting x\nWriting empty\nSkipping empty\n", trace);
+  EXPECT_EQ(1, WriteText("a", std::string(255, 'n')));  // there is no room beside it for its name and more
 }
 
 TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
@@ -47,10 +48,14 @@ TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
   EXPECT_EQ(0, WriteText("new", "none/x"));
   std::filesystem::create_directories("folder");
   EXPECT_EQ(0, WriteText("new", "folder"));
+  const std::string tooLong(256, 'n');
+  EXPECT_EQ(0, WriteText("new", tooLong));
   EXPECT_EQ(
       "Writing flagged\nError: File error (flagged) : Access is denied.\n"
       "Writing none/x\nError: File error (none/x) : The system cannot find the file specified.\n"
-      "Writing folder\nError: File error (folder) : Access is denied.\n",
+      "Writing folder\nError: File error (folder) : Access is denied.\n"
+      "Writing " +
+          tooLong + "\nError: File error (" + tooLong + ") : The filename or extension is too long.\n",
       trace);
   EXPECT_EQ("old", Read("flagged"));
   EXPECT_FALSE(FileExists(BesidePath("folder")) || FileExists(BesidePath("flagged")));
