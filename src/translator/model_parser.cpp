@@ -253,6 +253,9 @@ void ModelBlock::ParseEvolveEntry(std::vector<Evolution>& evolutions) {
   LexScanner code(TextRange(m_parser.current.text.end, nullptr));
   m_parser.SkipToMatching(kOpenBrace, kCloseBrace, kAtEnd);
   code.end = m_parser.current.text.begin;
+  // A line comment at the end would swallow the bracket that is written behind the code.
+  const char* lastToken = m_parser.previous.text.end;
+  if (std::string_view(lastToken, code.end).find("//") != std::string_view::npos) code.end = lastToken;
   SkipWhiteSpace(code);
   while (!code.Empty() && (code.end[-1] == ' ' || (code.end[-1] >= 9 && code.end[-1] <= 13))) --code.end;
   field.m_evolveCode = code.Text();

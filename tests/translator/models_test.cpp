@@ -154,13 +154,15 @@ TEST_F(ModelsTest, ThreeReleases) {
     $schema { 1: +a +b 3: -b +c +d +f 7: -d +e }
     $evolve
     {
-        d(b) { d = b * 1000; }
+        d(b) { d = b * 1000; // in pence
+        }
         e(d, a)
         {
             e = float(d);
             Log(a);
         }
-        f { }
+        f { // starts empty
+        }
     }
 };
 )")
