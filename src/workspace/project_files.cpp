@@ -102,13 +102,18 @@ void ProjectParser::ParseSearch(ProjectFolder& folder, const std::string& direct
     search.recurse = true;
     Advance();
   }
-  for (const std::string& root : m_project.settings->virtualTree) Find(search, root, folder, directory);
-  std::sort(search.matched.begin(), search.matched.end());  // two roots may hold one path
-  search.matched.erase(std::unique(search.matched.begin(), search.matched.end()), search.matched.end());
-  if (current.kind == kColon) ParseFileOptions(search.matched);
+  Find(search, folder, directory);
+  if (current.kind == kColon) ParseFileOptions({search.matched.begin(), search.matched.end()});
 }
 
-void ProjectParser::Find(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory) {
+// A directory that one root holds is searched under all of them; once, however many roots hold it.
+void ProjectParser::Find(Search& search, ProjectFolder& folder, const std::string& directory) {
+  if (!search.searched.insert(directory).second) return;
+  for (const std::string& root : m_project.settings->virtualTree) FindUnder(root, search, folder, directory);
+}
+
+void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFolder& folder,
+                              const std::string& directory) {
   std::string realPath;
   if (!RealPathOf(PathJoin(root, directory), realPath)) return;
   if (std::find(search.open.begin(), search.open.end(), realPath) != search.open.end()) return;  // a link to itself
@@ -126,24 +131,24 @@ void ProjectParser::Find(Search& search, const std::string& root, ProjectFolder&
       throw LexScannerException("Path is not valid UTF-8 : " + PathJoin(directory, name), current);
     }
     if (entry->IsDirectory()) {
-      FindInSubdirectory(search, root, folder, directory, name);
+      FindInSubdirectory(search, folder, directory, name);
     } else {
       names.push_back(name);
     }
   }
   for (const std::string& name : names) {
-    search.matched.push_back(&AddFile(folder, PathJoin(directory, name), name));
+    search.matched.insert(&AddFile(folder, PathJoin(directory, name), name));
   }
   search.open.pop_back();
 }
 
-void ProjectParser::FindInSubdirectory(Search& search, const std::string& root, ProjectFolder& folder,
-                                       const std::string& directory, const std::string& name) {
+void ProjectParser::FindInSubdirectory(Search& search, ProjectFolder& folder, const std::string& directory,
+                                       const std::string& name) {
   const std::string subdirectory = PathJoin(directory, name);
-  if (search.flat) return Find(search, root, folder, subdirectory);
+  if (search.flat) return Find(search, folder, subdirectory);
   bool isNew = false;
   ProjectFolder& subfolder = FolderNamed(folder, name, &isNew);
-  Find(search, root, subfolder, subdirectory);
+  Find(search, subfolder, subdirectory);
   if (isNew && subfolder.files.empty() && subfolder.subfolders.empty()) folder.subfolders.pop_back();
 }
 

@@ -1,6 +1,7 @@
 // Reads a project file: heads, statements, then the file tree.
 #pragma once
 
+#include <set>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -64,12 +65,13 @@ class ProjectParser : public MpfwParser {
     FileFilter filter;
     bool recurse = false;
     bool flat = false;
-    Files matched;
-    std::vector<std::string> open;  // the directories under search, outermost first, without links
+    std::set<ProjectFile*> matched;  // two roots may hold one file
+    std::set<std::string> searched;  // the directories, relative to the roots
+    std::vector<std::string> open;   // the directories under search, outermost first, without links
   };
-  void Find(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory);
-  void FindInSubdirectory(Search& search, const std::string& root, ProjectFolder& folder, const std::string& directory,
-                          const std::string& name);
+  void Find(Search& search, ProjectFolder& folder, const std::string& directory);
+  void FindUnder(const std::string& root, Search& search, ProjectFolder& folder, const std::string& directory);
+  void FindInSubdirectory(Search& search, ProjectFolder& folder, const std::string& directory, const std::string& name);
   ProjectFile& AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName);
   ProjectFolder& FolderNamed(ProjectFolder& parent, const std::string& name, bool* isNew = nullptr);
   void ParseFileOptions(const Files& files);

@@ -186,7 +186,7 @@ TEST_F(ProjectTest, Searches) {
   AssertTree("{ \"*.h\" }", "app/a.h app/f.h");
   AssertTree("{ \"*.h\" * }", "app/a.h app/f.h s{app/s/c.h app/s/g.h t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
   AssertTree("{ [\"?.h\" \"*.txt\"] flat * }",
-             "app/s/t/d.H app/s/c.h app/u/e.txt app/a.h app/s/g.h app/v/w/h.h app/f.h");
+             "app/s/t/d.H app/s/c.h app/s/g.h app/u/e.txt app/a.h app/v/w/h.h app/f.h");
   AssertTree("{ - [\"*.h\" \"*.qrpj\"] * }", "app/b.cpp u{app/u/e.txt}");
   AssertTree("{ + \"*.CPP\" - \"*.*\" }", "app/b.cpp");
   AssertTree("{ directories - [\"s\" \"V\"] \"*.h\" * }", "app/a.h app/f.h");
