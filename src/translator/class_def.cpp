@@ -13,8 +13,6 @@ namespace {
 constexpr TraitsKind kTraitsKinds[] = {TraitsKind::Struct, TraitsKind::Class, TraitsKind::Adt, TraitsKind::Other,
                                        TraitsKind::Model};
 
-bool OnOr(TriState state, bool otherwise) { return state == TriState::Unset ? otherwise : state == TriState::On; }
-
 }  // namespace
 
 ClassDef::ClassDef(ScannedFile& owner, const char* position, ClassKind kind)

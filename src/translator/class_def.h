@@ -18,6 +18,9 @@ enum class ClassKind { Struct, Class, Adt, Mixin, Model };
 std::string_view KeywordOf(ClassKind kind);
 
 enum class TriState : uint8_t { Unset, Off, On };  // `-word` is off, `word` is on
+inline bool OnOr(TriState state, bool otherwise) {
+  return state == TriState::Unset ? otherwise : state == TriState::On;
+}
 
 enum class FieldKind { Plain, Indep, Dep };
 

@@ -60,10 +60,10 @@ bool VariantDef::AllVoid() const {
 }
 
 // An item under test counts as passing, so a recursive variant terminates.
-bool VariantDef::CanSerialise() const {
+bool VariantDef::HasSerialise() const {
   if (qualifiers.ar != TriState::Unset) return qualifiers.ar == TriState::On;
-  if (m_canSerialise == Memo::NotComputed) {
-    m_canSerialise = Memo::BeingComputed;
+  if (m_hasSerialise == Memo::NotComputed) {
+    m_hasSerialise = Memo::BeingComputed;
     NameSpace& root = *owner.rootNameSpace;
     const bool can = std::all_of(m_items.begin(), m_items.end(), [&](const auto& item) {
       if (item->isVoid) return true;
@@ -71,10 +71,12 @@ bool VariantDef::CanSerialise() const {
       return std::all_of(item->fields.begin(), item->fields.end(),
                          [&](const ClassField& field) { return IsSerialisable(field.type, root); });
     });
-    m_canSerialise = can ? Memo::Yes : Memo::No;
+    m_hasSerialise = can ? Memo::Yes : Memo::No;
   }
-  return m_canSerialise != Memo::No;
+  return m_hasSerialise != Memo::No;
 }
+
+bool VariantDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
 
 bool VariantDef::ItemVisits(const VariantItem& item, bool (*test)(std::string_view, NameSpace&)) const {
   NameSpace& root = *owner.rootNameSpace;
@@ -100,7 +102,7 @@ uint32_t VariantDef::TypeOpsBits() const {
   uint32_t bits = kOpsDestruct;
   if (qualifiers.compare != TriState::Off) bits |= kOpsEqual | kOpsLess;
   if (qualifiers.print != TriState::Off) bits |= kOpsPrint;
-  if (qualifiers.ser == TriState::On || (qualifiers.ser != TriState::Off && CanSerialise())) bits |= kOpsSerialise;
+  if (CanSerialise()) bits |= kOpsSerialise;
   if (m_hasDefault) bits |= kOpsConstruct;
   if (qualifiers.copy != TriState::Off) bits |= kOpsCopy;
   if (IsIObjectVisitable()) bits |= kOpsVisitObjects;

@@ -38,7 +38,8 @@ class VariantDef : public NameSpaceElement, public TypeBehaviour {
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
   bool ContainsMetaData() const override;
 
-  bool CanSerialise() const override;
+  bool HasSerialise() const;           // of its own
+  bool CanSerialise() const override;  // as a type of items and fields
   bool IsIObjectVisitable() const override;
   bool IsPrefVisitable() const override;
   bool ItemVisits(const VariantItem& item, bool (*test)(std::string_view, NameSpace&)) const;
@@ -52,7 +53,7 @@ class VariantDef : public NameSpaceElement, public TypeBehaviour {
 
  private:
   enum class Memo { NotComputed, BeingComputed, No, Yes };
-  mutable Memo m_canSerialise = Memo::NotComputed;
+  mutable Memo m_hasSerialise = Memo::NotComputed;
   mutable Memo m_visitsObjects = Memo::NotComputed, m_visitsPrefs = Memo::NotComputed;
   bool AnyItemVisits(Memo& memo, bool (*test)(std::string_view, NameSpace&)) const;
 };

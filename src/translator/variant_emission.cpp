@@ -41,7 +41,7 @@ void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item
     WriteJoined(out, item.fields, " << ','", [&](const ClassField& field) { out << " << " << field.name; });
     out << " << ')'; }\n";
   }
-  if (def.CanSerialise()) {
+  if (def.HasSerialise()) {
     out << "template<typename Archive> void Serialise(Archive& _ar) const { _ar";
     for (const ClassField& field : item.fields) out << " << " << field.name;
     out << "; }\n";
@@ -130,7 +130,7 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
            "template<typename T> typename _mapvalue_<T>::Value& as() { return as((T*)0); }\n";
   }
   if (def.WritesToStream()) out << "void Write(vesk::xostream&) const;\n";
-  if (def.CanSerialise()) {
+  if (def.HasSerialise()) {
     out << "template<typename Archive> void Serialise(Archive&) const;\n"
            "template<typename Archive> void Deserialise(Archive&);\n";
   }
@@ -174,7 +174,7 @@ class VariantTail {
     if (m_def.WritesToStream()) WriteStreamWrite();
     WriteVisit("Objects", "IObjectVisitor", NeedsVisitObjects);
     WriteVisit("Prefs", "IPrefVisitor", NeedsVisitPrefs);
-    if (m_def.CanSerialise()) WriteArchives();
+    if (m_def.HasSerialise()) WriteArchives();
   }
 
  private:
@@ -221,7 +221,7 @@ class VariantTail {
                 "$0vesk::TypeOps const& _GetTypeOps($1 const*);\n",
                 {api, m_name});
     }
-    if (m_def.CanSerialise()) {
+    if (m_def.HasSerialise()) {
       WriteText(m_out,
                 "template<typename Archive> inline void Serialise(Archive& _ar,$0 const& _x) { _x.Serialise(_ar); }\n"
                 "template<typename Archive> inline void Deserialise(Archive& _ar,$0 & _x) { _x.Deserialise(_ar); }\n",

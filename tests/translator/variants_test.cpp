@@ -312,6 +312,8 @@ TEST_F(VariantsTest, Serialisability) {
   EXPECT_FALSE(serialises("$variant V <<-ar>> { int32; };"));
   EXPECT_TRUE(serialises("$variant V; $variant V { *xvector<V> children; int32 leaf; };"));  // under test
   EXPECT_FALSE(serialises("$variant W <<-ar>> { int32; }; $variant V { W w; };"));
+  EXPECT_FALSE(serialises("$variant W <<-ser>> { int32; }; $variant V { W w; };"));
+  EXPECT_TRUE(serialises("$variant W <<ser -ar>> { int32; }; $variant V { W w; };"));
 }
 
 TEST_F(VariantsTest, NamesOfItemsInRecords) {
