@@ -169,29 +169,26 @@ void ParseWarning(QrexParser& parser) {
   parser.Advance();
   if (!parser.Is(kOpenParen)) parser.FailExpected("(");
   parser.Advance();
-  if (!parser.Is(kCloseParen)) {
-    for (;;) {
-      if (parser.AcceptWord("push")) {
-        parser.m_savedWarnings.push_back(parser.m_warnings);
-      } else if (parser.AcceptWord("pop")) {
-        if (parser.m_savedWarnings.empty()) parser.Fail("$warning pop without matching push");
-        parser.m_warnings = parser.m_savedWarnings.back();
-        parser.m_savedWarnings.pop_back();
-      } else if (parser.Is("enable") || parser.Is("disable")) {
-        const bool on = parser.Is("enable");
-        parser.Advance();
-        parser.Expect(kColon, ":");
-        do {
-          const int64_t code = parser.ReadInt64();
-          if (code < kFirstWarning || code > kLastWarning) parser.Fail("Invalid warning code : " + ToString(code));
-          parser.m_warnings[static_cast<size_t>(code - kFirstWarning)] = on;
-        } while (!parser.Is(kSemicolon) && !parser.Is(kCloseParen));
-      } else {
-        parser.FailExpected("push/pop/enable/disable");
-      }
-      if (parser.Is(kCloseParen)) break;
-      parser.Expect(kSemicolon, "; or )");
+  while (!parser.Is(kCloseParen)) {
+    if (parser.AcceptWord("push")) {
+      parser.m_savedWarnings.push_back(parser.m_warnings);
+    } else if (parser.AcceptWord("pop")) {
+      if (parser.m_savedWarnings.empty()) parser.Fail("$warning pop without matching push");
+      parser.m_warnings = parser.m_savedWarnings.back();
+      parser.m_savedWarnings.pop_back();
+    } else if (parser.Is("enable") || parser.Is("disable")) {
+      const bool on = parser.Is("enable");
+      parser.Advance();
+      parser.Expect(kColon, ":");
+      do {
+        const int64_t code = parser.ReadInt64();
+        if (code < kFirstWarning || code > kLastWarning) parser.Fail("Invalid warning code : " + ToString(code));
+        parser.m_warnings[static_cast<size_t>(code - kFirstWarning)] = on;
+      } while (!parser.Is(kSemicolon) && !parser.Is(kCloseParen));
+    } else {
+      parser.FailExpected("push/pop/enable/disable");
     }
+    if (!parser.Is(kCloseParen)) parser.Expect(kSemicolon, "; or )");
   }
   parser.DropBehindCurrent();
 }

@@ -174,7 +174,7 @@ TEST_F(NameSpaceTest, WarningSwitches) {
       {"$warning(disable:1004) " + fault, ""},
       {"$warning(disable:1000 1002+2) " + fault, ""},
       {"$warning(disable:1003 1005) " + fault, warning},
-      {"$warning(disable:1004; enable : 1004) " + fault, warning},
+      {"$warning(disable:1004; enable : 1004;) " + fault, warning},
       {"$warning(disable:1004; push; enable:1004) " + fault + "$warning(pop) $struct B <<dc>> { };", warning},
       {fault + "\n$warning(push)\n", warning + "t.h(2) : warning W1015 : $warning(push) without matching pop\n"},
   });
