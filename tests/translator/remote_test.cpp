@@ -19,7 +19,7 @@ class RemoteTest : public TranslateTest {
 };
 
 TEST_F(RemoteTest, IpcIsAStubAndAScion) {
-  EXPECT_EQ(Section(Folded(TranslateHeader(Declared("ipc")).tail), "} // n\n", "struct ScionJFactory"), R"(
+  EXPECT_EQ(Section(Folded(TranslateHeader(Declared("ipc")).tail), "} // n\n", "    ~ScionJFactory"), R"(
 //### Registration of stub/scion of $interface+ n::J
 namespace n
 {
@@ -116,37 +116,25 @@ struct ScionJ : vesk::Scion
         return t;
     }
 };
+struct ScionJFactory : public vesk::IScionFactory
+{
+    ScionJFactory()
+    {
+        vesk::RegisterScion(vesk::GetIpcInterfaceName<J>(),this);
+    }
 )");
   EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
             (std::vector<std::string>{"n::J", "n::StubJ", "n::ScionJ"}));
 }
 
 TEST_F(RemoteTest, RmiIsAStubAndASkeleton) {
-  const std::string tail = TranslateHeader(Declared("ipc rmi")).tail;
-  EXPECT_EQ(Section(tail, "Result_back", "\n"), "(vesk::InputArchive& _ar, void** _p)");
-  EXPECT_EQ(Section(tail, "struct SkeletonJ", "    void Thunk1()"), R"( : vesk::Skeleton
-{
-    SkeletonJ() : vesk::Skeleton(GetSkeletonThunkFnTable(),3) {}
-    vesk::ptr<J> Invoke()
-    {
-        return vesk::ptr<J>(m_delegate.m_self, m_delegate.m_table);
-    }
-    void Thunk0()
-    {
-        Pop();
-        Invoke()->none();
-    }
-)");
-  EXPECT_EQ(Section(tail, "sThunk1(void* _self)", "            &sThunk0"), R"( { ((SkeletonJ*)_self)->Thunk1(); }
-    static void sThunk2(void* _self) { ((SkeletonJ*)_self)->Thunk2(); }
-    static const vesk::SkeletonThunkFn* GetSkeletonThunkFnTable()
-    {
-        static const vesk::SkeletonThunkFn t[] =
-        {
-)");
-  EXPECT_EQ(Section(tail, "struct SkeletonJFactory : public ", "\n    ~"),
-            "vesk::ISkeletonFactory\n{\n    SkeletonJFactory()\n    {\n"
-            "        vesk::RegisterSkeleton(vesk::GetIpcInterfaceName<J>(),this);\n    }");
+  std::string expected = TranslateHeader(Declared("ipc")).tail;
+  ReplaceAllInPlace(expected, "Scion", "Skeleton");
+  ReplaceAllInPlace(expected, "(vesk::Archive& _ar, void** _p)", "(vesk::InputArchive& _ar, void** _p)");
+  ReplaceAllInPlace(expected, "J& Invoke()", "vesk::ptr<J> Invoke()");
+  ReplaceAllInPlace(expected, "reinterpret_cast<J&>(m_delegate)",
+                    "vesk::ptr<J>(m_delegate.m_self, m_delegate.m_table)");
+  EXPECT_EQ(TranslateHeader(Declared("ipc rmi")).tail, expected);
   EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
             (std::vector<std::string>{"n::J", "n::StubJ", "n::SkeletonJ"}));
 }
