@@ -111,7 +111,9 @@ class cref : public PersistentReference {
 // Asks an object for another of its interfaces. Null when it has none of that name. I must be registered.
 template <typename I, typename J>
 ptr<I> QueryInterface(ptr<J> const& p) {
-  return p ? ptr<I>(p->QueryInterface(GetReflectedInterface<I>())) : ptr<I>();
+  if (!p) return ptr<I>();
+  std::remove_const_t<J> object = *p;  // asking changes nothing, though the method is not const
+  return ptr<I>(object.QueryInterface(GetReflectedInterface<std::remove_const_t<I>>()));
 }
 
 }  // namespace vesk

@@ -47,7 +47,7 @@ $model+ Everything
     pref<IDoc> doc;
     movable<pref<IDoc>> movableDoc;
     xvector<movable<pref<IDoc>>> docs;
-    xvector<pref<IDoc>> plainDocs;
+    xvector<pref<const IDoc>> plainDocs;
     assignable<xvector<int32>> assigned;
     offsettable<uint16> offset;
     Size size;
