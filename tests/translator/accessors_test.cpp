@@ -213,64 +213,7 @@ TEST_F(AccessorsTest, OperatorsOfAttributes) {
 }
 
 TEST_F(AccessorsTest, ProxiesOfTwoDimensions) {
-  EXPECT_EQ(AttributeStruct("int32 x[2][3]"), Spelt(R"(        struct
-        {
-            operator vesk::Array<vesk::Array<vesk::int32,3>,2> const&() const { return CAT->Getx(); }
-            vesk::Array<vesk::Array<vesk::int32,3>,2> const& read() const { return CAT->Getx(); }
-            vesk::Array<vesk::Array<vesk::int32,3>,2> & write() { return AT->Writex(); }
-            vesk::Array<vesk::Array<vesk::int32,3>,2> const& model() const { return CAT->_model__x(); }
-            vesk::Array<vesk::Array<vesk::int32,3>,2>& model() { return AT->_model__x(); }
-            vesk::Path path() const { return CAT->GetxPath(); }
-            struct xElement
-            {
-                xElement(K_model_mixin* _self, vesk::ssize_t _k) : _self(_self),_k0(_k) {}
-                vesk::Path GetxElementPath() const { return _self->GetxElementPath(_k0); }
-                vesk::Array<vesk::int32,3> const& _model__xElement() const { return _self->_model__xElement(_k0); }
-                vesk::Array<vesk::int32,3>& _model__xElement() { return _self->_model__xElement(_k0); }
-                vesk::Array<vesk::int32,3> const& GetxElement() const { return _self->GetxElement(_k0); }
-                vesk::ssize_t GetxElementSize() const { return _self->GetxElementSize(_k0); }
-                vesk::int32 const& GetxElementElement(vesk::ssize_t _k1) const { return _self->GetxElementElement(_k0,_k1); }
-                void SetxElementElement(vesk::ssize_t _k1,vesk::int32 _e) { _self->SetxElementElement(_k0,_k1,_e); }
-                operator vesk::Array<vesk::int32,3> const&() const { return _self->GetxElement(_k0); }
-                vesk::Array<vesk::int32,3> const& read() const { return _self->GetxElement(_k0); }
-                vesk::Array<vesk::int32,3> & write() { return _self->WritexElement(_k0); }
-                vesk::Array<vesk::int32,3> const& model() const { return _self->_model__xElement(_k0); }
-                vesk::Array<vesk::int32,3>& model() { return _self->_model__xElement(_k0); }
-                vesk::Path path() const { return _self->GetxElementPath(_k0); }
-                struct xElementElement
-                {
-                    xElementElement(xElement* _self, vesk::ssize_t _k) : _self(_self),_k1(_k) {}
-                    operator vesk::int32 const&() const { return _self->GetxElementElement(_k1); }
-                    vesk::int32 const& read() const { return _self->GetxElementElement(_k1); }
-                    vesk::int32 & write() { return _self->WritexElementElement(_k1); }
-                    vesk::int32 const& model() const { return _self->_model__xElementElement(_k1); }
-                    vesk::int32& model() { return _self->_model__xElementElement(_k1); }
-                    vesk::Path path() const { return _self->GetxElementElementPath(_k1); }
-                    void operator=(vesk::int32 const& _v) { _self->SetxElementElement(_k1,_v); }
-                    xElement* _self;
-                    vesk::ssize_t _k1;
-                };
-                xElementElement operator[](vesk::ssize_t _k1)
-                {
-                    return xElementElement(this,_k1);
-                }
-                xElementElement const operator[](vesk::ssize_t _k1) const
-                {
-                    return xElementElement(const_cast<xElement*>(this),_k1);
-                }
-                K_model_mixin* _self;
-                vesk::ssize_t _k0;
-            };
-            xElement operator[](vesk::ssize_t _k0)
-            {
-                return xElement(AT,_k0);
-            }
-            xElement const operator[](vesk::ssize_t _k0) const
-            {
-                return xElement(const_cast<K_model_mixin*>(CAT),_k0);
-            }
-        } x;
-)"));
+  EXPECT_EQ(AttributeStruct("int32 x[2][3]"), Spelt(Golden("accessors_proxies_of_two_dimensions")));
 }
 
 // Forwarders hand on what each sort of element offers, with the proxy's own key in front.

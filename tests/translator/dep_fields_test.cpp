@@ -8,79 +8,7 @@ namespace {
 using DepFieldsTest = TranslateTest;
 
 TEST_F(DepFieldsTest, DepWithAllSections) {
-  EXPECT_EQ(R"(void a_calc(vesk::string8& a) const
-{ a = name(); } 
-void a_create(vesk::string8& a) const
-{ make(a); } 
-void a_destroy(vesk::string8& a) const
-{ }
-
-void a_visit(vesk::IObjectVisitor& _v) const
-{ _v << S::shared; } 
-bool a_evictable() const
-{ return this->GetThisAsFinalClass()->free(); }
-
-void a_evict() const
-{ vesk::DollarNew(new X(1)); $other; } 
-void a_invalidate() const
-{
-    stale();
-}
-
-mutable vesk::string8 _a_;
-struct Depnode_a : vesk::DGDepNode
-{
-    typedef vesk::string8 value_type;
-    Depnode_a() : vesk::DGDepNode(vesk::DF_SYNC_DEP)
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_create(_self->_a_);
-    }
-    ~Depnode_a()
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_destroy(_self->_a_);
-    }
-    virtual vesk::ssize_t ByteSize() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        return vesk::CacheValueAdditionalSize(_self->_a_);
-    }
-    virtual vesk::xstring Name() const { return "S::a"; }
-    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_visit(_v);
-    }
-    virtual bool RecalcCache() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        auto _prev = _self->_a_;
-        _self->a_calc(_self->_a_);
-        if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();
-        return _prev != _self->_a_;
-    }
-    virtual bool IsEvictable() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        return _self->a_evictable();
-    }
-    virtual void OnEvict() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_evict();
-    }
-    virtual void OnInvalidate() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_invalidate();
-    }
-    value_type const& read() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
-    operator value_type const&() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
-} a;
-vesk::string8 const& Geta() const { a.ReadBarrier(); return _a_; }
-
-)",
+  EXPECT_EQ(Golden("dep_fields_dep_with_all_sections"),
             Body("$dep string8 a calc { a = name(); } create { make(a); } destroy { }\n"
                  "visit { _v << $$::shared; } evictable { return $this->free(); }\n"
                  "evict { $new X(1); $other; } invalidate\n{\n    stale();\n}\n;\n"));
@@ -148,54 +76,7 @@ TEST_F(DepFieldsTest, ShortBodies) {
 }
 
 TEST_F(DepFieldsTest, IndepWithSections) {
-  EXPECT_EQ(R"(void w_create(int*& w) const
-{ } 
-void w_destroy(int*& w) const
-{ } 
-bool w_evictable() const
-{ return false; } 
-void w_evict() const
-{ }
-int* _w_;
-struct Indepnode_w : vesk::DGIndepNode
-{
-    typedef int* value_type;
-    Indepnode_w()
-    {
-        S* _self = ATTRIB_CAST(S,w);
-        _self->w_create(_self->_w_);
-    }
-    ~Indepnode_w()
-    {
-        S* _self = ATTRIB_CAST(S,w);
-        _self->w_destroy(_self->_w_);
-    }
-    virtual vesk::ssize_t ByteSize() const { return 0; }
-    virtual vesk::xstring Name() const { return "S::w"; }
-    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,w);
-        _v << _self->_w_;
-    }
-    virtual bool IsEvictable() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,w);
-        return _self->w_evictable();
-    }
-    virtual void OnEvict() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,w);
-        _self->w_evict();
-    }
-    value_type read() const { ReadBarrier(); return CONST_ATTRIB_CAST(S,w)->_w_; }
-    value_type& write() { OnChange(); return ATTRIB_CAST(S,w)->_w_; }
-    operator value_type() const { return CONST_ATTRIB_CAST(S,w)->Getw(); }
-    void operator=(value_type _v) { write() = _v; }
-} w;
-int* Getw() const { w.ReadBarrier(); return _w_; }
-void Setw(int* _v) { w.OnChange(); _w_ = _v; }
-
-)",
+  EXPECT_EQ(Golden("dep_fields_indep_with_sections"),
             Body("$indep int* w create { } destroy { } evictable { return false; } evict { };\n"));
 }
 

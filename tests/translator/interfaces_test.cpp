@@ -13,83 +13,9 @@ $interface+ D : [ "doc" ] : K, L { void d(const string8& s, int32 n=3); int32 v;
 
 TEST_F(InterfacesTest, DiamondWithAttributes) {
   const Generated generated = TranslateHeader(kDiamond);
-  EXPECT_EQ(Section(generated.header, "struct D\n", ""), R"({
-    struct FnTable
-    {
-        K::FnTable _K;
-        L::FnTable _L;
-        void (__stdcall *d)(void* _self,vesk::string8 const& s,vesk::int32 n);
-        vesk::int32 (__stdcall *Getv)(void const* _self);
-        void (__stdcall *Setv)(void* _self,vesk::int32 v);
-    };
-    D(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
-    
-    void AssignFrom(D& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
-    void AssignFrom(D const& _rhs) const { const_cast<D*>(this)->m_self = _rhs.m_self; const_cast<D*>(this)->m_table = _rhs.m_table; }
-    
-    template<typename T> struct Stubs
-    {
-        static void __stdcall d(void* _self,vesk::string8 const& s,vesk::int32 n) { ((T*)_self)->d(s,n); }
-        static vesk::int32 __stdcall Getv(void const* _self) { return ((const T*)_self)->Getv(); }
-        static void __stdcall Setv(void* _self,vesk::int32 v) { ((T*)_self)->Setv(v); }
-        static const FnTable& GetTable()
-        {
-            static const FnTable t =
-            {
-                {
-                    {
-                        &A::Stubs<T>::a,
-                    },
-                    &K::Stubs<T>::k,
-                },
-                {
-                    {
-                        &A::Stubs<T>::a,
-                    },
-                },
-                &d,
-                &Getv,
-                &Setv
-            };
-            return t;
-        }
-    };
-    
-    template<typename T> void CoerceFrom(T* _rhs) { m_self = _rhs; m_table = &Stubs<T>::GetTable(); }
-    template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<D*>(this)->m_self = const_cast<T*>(_rhs); const_cast<D*>(this)->m_table = &Stubs<T>::GetTable(); }
-    
-    void a(vesk::int32 i) { m_table->_K._A.a(m_self,i); }
-    vesk::int32 k() const { return m_table->_K.k(m_self); }
-    void d(vesk::string8 const& s,vesk::int32 n=3) { m_table->d(m_self,s,n); }
-    vesk::int32 Getv() const { return m_table->Getv(m_self); }
-    void Setv(vesk::int32 v) { m_table->Setv(m_self,v); }
-    
-    operator A() const { return A(m_self, &m_table->_K._A); }
-    operator K() const { return K(m_self, &m_table->_K); }
-    operator L() const { return L(m_self, &m_table->_L); }
-    
-    union
-    {
-        struct
-        {
-            operator vesk::int32() const { return CONST_ATTRIB_CAST(D,v)->Getv(); }
-            void operator=(vesk::int32 const& _v) { ATTRIB_CAST(D,v)->Setv(_v); }
-        } v;
-        void* m_self;
-    };
-    FnTable const* m_table;
-};
-template <typename BC>
-struct DDelegatorMixin : public BC
-{
-    void d(vesk::string8 const& s,vesk::int32 n=3) { BC::GetD().d(s,n); }
-    vesk::int32 Getv() const { return BC::GetD().Getv(); }
-    void Setv(vesk::int32 v) { BC::GetD().Setv(v); }
-};
-
-vesk::ReflectedInterface const& _GetReflected(D const*);
-
-)" + TraitsText("D", "interface", "1111") + R"(template<> struct InterfaceTypeTraits<D>
+  EXPECT_EQ(Section(generated.header, "struct D\n", ""), Golden("interfaces_diamond_with_attributes") +
+                                                             TraitsText("D", "interface", "1111") +
+                                                             R"(template<> struct InterfaceTypeTraits<D>
 {
     static const bool is_ipc = false;
     static const bool is_rmi = false;
@@ -101,32 +27,7 @@ template<> struct _is_indirect_superinterface_of<A,D> { static const bool value 
 
 )");
   EXPECT_EQ(Folded(Section(generated.tail, "_GetReflected(D const*)\n", "    \n    // Registration")),
-            R"(    {
-        static const vesk::octet_t D_metadata[] = { 0xe1,0xa4,0x00,0x00 };
-        static vesk::ConstStringZ D_bases[] = { "K", "L", };
-        static const vesk::octet_t D_d_s[] = { 0x36,0x31,0x10 };
-        static const vesk::octet_t D_d_n[] = { 0x04 };
-        static const vesk::ReflectedArg D_d_args[] = { { "s", D_d_s }, { "n", D_d_n }, };
-        static const vesk::octet_t D_Getv_return[] = { 0x04 };
-        static const vesk::octet_t D_Setv_v[] = { 0x04 };
-        static const vesk::ReflectedArg D_Setv_args[] = { { "v", D_Setv_v }, };
-        static const vesk::octet_t D_v[] = { 0x04 };
-        static const vesk::ReflectedAttribute D_attributes[] = { { "v",D_v }, };
-        static vesk::ConstStringZ D_stringTable[] = { "doc", };
-        static const vesk::ReflectedInterfaceMethod D_methods[] = { {"d",{0},D_d_args,2,0}, {"Getv",{D_Getv_return},0,0,0}, {"Setv",{0},D_Setv_args,1,0}, };
-        static const vesk::ReflectedInterface D_interface =
-        {
-            "D",
-            D_metadata,
-            D_bases,2,
-            3,
-            D_methods,3,
-            D_attributes,1,
-            D_stringTable
-        };
-        return D_interface;
-    }
-)");
+            Golden("interfaces_diamond_with_attributes_tail"));
 }
 
 TEST_F(InterfacesTest, AttributesBecomeMethods) {

@@ -7,142 +7,7 @@ using ModelsTest = TranslateTest;
 
 TEST_F(ModelsTest, WithoutSchema) {
   EXPECT_EQ(Section(TranslateHeader("$model Point\n{\n    string8 name;\n};\n").header, "", "\nnamespace vesk\n"),
-            R"(struct Point
-{
-    
-    Point() {}
-    explicit Point(vesk::string8 const& name_) : name(name_) {}
-    void Serialise(vesk::Archive&) const;
-    void Deserialise(vesk::InputArchive&);
-    void EvictDgsNodes() const;
-    void VisitObjects(vesk::IObjectVisitor& _v) const;
-    void VisitPrefs(vesk::IPrefVisitor& _v) const;
-    bool operator<(Point const& _rhs) const
-    {
-        return (name < _rhs.name);
-    }
-    bool operator==(Point const& _rhs) const
-    {
-        return name == _rhs.name;
-    }
-    bool operator!=(Point const& _rhs) const { return !operator==(_rhs); }
-    bool operator<=(Point const& _rhs) const { return !_rhs.operator<(*this); }
-    bool operator>(Point const& _rhs) const { return _rhs.operator<(*this); }
-    bool operator>=(Point const& _rhs) const { return !operator<(_rhs); }
-    
-    static void GetnamePath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=0; }
-    static vesk::Path GetnamePath() { vesk::Path _path; GetnamePath(_path); return _path; }
-    vesk::string8 const& _model__name() const { return name; }
-    vesk::string8& _model__name() { return name; }
-    vesk::string8 const& Getname() const { return name; }
-    void CreateIntoname(vesk::ssize_t _i,vesk::char8 const* _src,vesk::ssize_t _n)
-    {
-        name.insert(name.begin()+_i,_src,_src+_n);
-    }
-    void DeleteFromname(vesk::ssize_t _i1,vesk::ssize_t _i2)
-    {
-        name.erase(_i1,_i2-_i1);
-    }
-    
-    vesk::string8 name;
-};
-template <typename BC>
-struct Point_model_mixin : public BC
-{
-    using typename BC::FinalClass;
-    
-    bool operator<(Point_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
-    bool operator==(Point_model_mixin const& _rhs) const {return _model_ == _rhs._model_;}
-    bool operator!=(Point_model_mixin const& _rhs) const { return !operator==(_rhs); }
-    bool operator<=(Point_model_mixin const& _rhs) const { return !_rhs.operator<(*this); }
-    bool operator>(Point_model_mixin const& _rhs) const { return _rhs.operator<(*this); }
-    bool operator>=(Point_model_mixin const& _rhs) const { return !operator<(_rhs); }
-    void EvictDgsNodes() const {BC::EvictDgsNodes();_model_.EvictDgsNodes();}
-    void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}
-    void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}
-    
-    static void GetnamePath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=0; }
-    static vesk::Path GetnamePath() { vesk::Path _path; GetnamePath(_path); return _path; }
-    vesk::string8 const& _model__name() const { return _model_.name; }
-    vesk::string8& _model__name() { return _model_.name; }
-    vesk::string8 const& Getname() const { vesk::DataSourceReadBarrier(&_model_.name,vesk::null,"Point::_model_.name"); return _model_.name; }
-    void CreateIntoname(vesk::ssize_t _i,vesk::char8 const* _src,vesk::ssize_t _n)
-    {
-        vesk::DataSourceWriteBarrier(&_model_.name,vesk::null,"Point::_model_.name"); _model_.name.insert(_model_.name.begin()+_i,_src,_src+_n);
-    }
-    void DeleteFromname(vesk::ssize_t _i1,vesk::ssize_t _i2)
-    {
-        vesk::DataSourceWriteBarrier(&_model_.name,vesk::null,"Point::_model_.name"); _model_.name.erase(_i1,_i2-_i1);
-    }
-    union
-    {
-        struct
-        {
-            operator vesk::string8 const&() const { return CONST_ATTRIB_CAST(Point_model_mixin,name)->Getname(); }
-            vesk::string8 const& read() const { return CONST_ATTRIB_CAST(Point_model_mixin,name)->Getname(); }
-            vesk::string8 & write() { return ATTRIB_CAST(Point_model_mixin,name)->Writename(); }
-            vesk::string8 const& model() const { return CONST_ATTRIB_CAST(Point_model_mixin,name)->_model__name(); }
-            vesk::string8& model() { return ATTRIB_CAST(Point_model_mixin,name)->_model__name(); }
-            vesk::Path path() const { return CONST_ATTRIB_CAST(Point_model_mixin,name)->GetnamePath(); }
-            void insert(vesk::ssize_t _i,vesk::char8 const* _src,vesk::ssize_t _n)
-            {
-                ATTRIB_CAST(Point_model_mixin,name)->CreateIntoname(_i,_src,_n);
-            }
-            void insert(vesk::ssize_t _i,vesk::char8 const& _v)
-            {
-                insert(_i,&_v,1);
-            }
-            void push_front(vesk::char8 const& _v)
-            {
-                insert(0,_v);
-            }
-            void push_back(vesk::char8 const& _v)
-            {
-                insert(model().size(),_v);
-            }
-            void erase_range(vesk::ssize_t _i1,vesk::ssize_t _i2)
-            {
-                ATTRIB_CAST(Point_model_mixin,name)->DeleteFromname(_i1,_i2);
-            }
-            void erase(vesk::ssize_t _i)
-            {
-                erase_range(_i,_i+1);
-            }
-            void pop_front()
-            {
-                erase(0);
-            }
-            void pop_back()
-            {
-                erase(model().size()-1);
-            }
-            void clear()
-            {
-                erase_range(0,model().size());
-            }
-        } name;
-    };
-    typedef Point model_type;
-    Point const& model() const { return _model_; }
-    Point& model() { return _model_; }
-    Point const& read() const { vesk::DataSourceReadBarrier(static_cast<const typename BC::FinalClass*>(this), vesk::null,"Point"); return _model_; }
-    Point & write() { vesk::DataSourceWriteBarrier(static_cast<typename BC::FinalClass*>(this), vesk::null,"Point"); return _model_; }
-    Point _model_;
-};
-
-inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,Point const& _x) { _x.VisitObjects(_v); return _v; }
-inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,Point const*) { return _v; }
-inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,Point const& _x) { _x.VisitPrefs(_v); return _v; }
-
-template<typename Archive> inline void Serialise(Archive& _ar,Point const& _x) { _x.Serialise(_ar); }
-
-template<typename Archive> inline void Deserialise(Archive& _ar,Point& _x) { _x.Deserialise(_ar); }
-inline vesk::xostream& operator<<(vesk::xostream& _os,Point const& _x)
-{
-    _os << "Point(" << _x.name << ')';
-    return _os;
-}
-)");
+            Golden("models_without_schema"));
 }
 
 // Three releases: `c` and `e` come late, one with code; `b` and `d` go, and the code of later fields reads them.
@@ -169,47 +34,8 @@ TEST_F(ModelsTest, ThreeReleases) {
                                .tail;
   EXPECT_EQ(Section(tail, "XTarget* app_GetXTarget(); }\n", "    vesk::Ref"),
             "namespace vesk { RSN app_GetModelRsn(); }\n");
-  EXPECT_EQ(
-      Section(tail, "    void Record::EvictDgsNodes", "    \n    // Registration"),
-      R"(() const {vesk::DataSourceEvict(&a);vesk::DataSourceEvict(&c);vesk::DataSourceEvict(&f);vesk::DataSourceEvict(&e);}
-    void Record::VisitObjects(vesk::IObjectVisitor& _v) const {}
-    void Record::VisitPrefs(vesk::IPrefVisitor& _v) const {}
-    void Record::Serialise(vesk::Archive& _ar) const
-    {
-        _ar << this->a
-           << this->c
-           << this->f
-           << this->e;
-    }
-    void Record::Deserialise(vesk::InputArchive& _ar)
-    {
-        vesk::RSN _rsn = vesk::app_GetModelRsn();
-        struct EvolveCode
-        {
-            static void calc_d(vesk::int64& d,vesk::int32 const& b) { d = b * 1000; }
-            static void calc_e(vesk::float32& e,vesk::int64 const& d,vesk::string8 const& a) { e = float(d);
-                        Log(a); }
-        };
-        
-        _ar >> this->a;
-        
-        vesk::int32 b;
-        if (_rsn < 3) _ar >> b;
-        
-        if (_rsn <= 2) {  }
-        else _ar >> this->c;
-        
-        vesk::int64 d;
-        if (_rsn <= 2) { EvolveCode::calc_d(d,b); }
-        else if (_rsn < 7) _ar >> d;
-        
-        if (_rsn <= 2) {  }
-        else _ar >> this->f;
-        
-        if (_rsn <= 6) { EvolveCode::calc_e(e,d,a); }
-        else _ar >> this->e;
-    }
-)");
+  EXPECT_EQ(Section(tail, "    void Record::EvictDgsNodes", "    \n    // Registration"),
+            Golden("models_three_releases"));
   EXPECT_EQ(Section(tail, "_modelFields[] =\n", "        };\n"), R"(        {
             { "a", offsetof(Record,a), Record_a, 1, -1 },
             { "b", -1, Record_b, 1, 3 },
@@ -282,31 +108,7 @@ class K;
 
 )");
   EXPECT_EQ(Section(header, "using_model_base_class = 1;\n};\n} // namespace vesk\n", ""),
-            R"(class K : public K_model_mixin<vesk::BaseMixin<K,vesk::EmptyBase>>
-{
-public:
-    typedef K_model_mixin<vesk::BaseMixin<K,vesk::EmptyBase>> BaseClass;
-
-    int more;
-
-public:
-    
-    void Serialise(vesk::Archive&) const;
-    void Deserialise(vesk::InputArchive&);
-};
-
-
-inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,K const& _x) { _x.VisitObjects(_v); return _v; }
-inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,K const*) { return _v; }
-inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,K const& _x) { _x.VisitPrefs(_v); return _v; }
-
-template<typename Archive> inline void Serialise(Archive& _ar,K const& _x) { _x.Serialise(_ar); }
-
-template<typename Archive> inline void Deserialise(Archive& _ar,K& _x) { _x.Deserialise(_ar); }
-
-inline vesk::xostream& operator<<(vesk::xostream& _os,K const& _x) { _os << _x._model_; return _os; }
-
-)");
+            Golden("models_class_of_named_model"));
   EXPECT_EQ(Section(TranslateHeader(declarations).tail, "//### $class K\n", "//### $model M\n"),
             R"(namespace vesk { XTarget* app_GetXTarget(); }
 namespace vesk

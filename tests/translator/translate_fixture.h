@@ -112,6 +112,14 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     host = std::make_unique<TestHost>(*workspace, *app().configs.front());
   }
 
+  // Generated text that is too long to stand in a test.
+  static std::string Golden(const std::string& name) {
+    const std::string path = std::string(QREX_SOURCE_DIR "/tests/translator/golden/") + name + ".txt";
+    std::string text;
+    EXPECT_TRUE(ReadWholeFile(text, path)) << path;
+    return text;
+  }
+
   void OnTrace(std::string_view text) override { trace.append(text); }
   Project& app() { return *workspace->projects.front(); }
 
