@@ -127,9 +127,9 @@ bool ReadFile(const std::string& path, std::string& content) {
   }
 }
 
-bool WriteFile(const std::string& path, std::string_view content, bool mustBeNew) {
-  if (RefuseReadOnly(path)) return false;
-  Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC | (mustBeNew ? O_EXCL : 0));
+bool WriteFile(const std::string& path, std::string_view content) {
+  SetLastError(0);
+  Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC);
   if (!file) return false;
   while (!content.empty()) {
     const ssize_t written = write(file.Number(), content.data(), content.size());

@@ -47,7 +47,7 @@ bool ReadFile(const std::string& path, std::string& content);
 // Memory that is about to be filled is had faster in large pages. No more than a hint.
 void PreferLargePages(void* memory, size_t size);
 void ReserveText(std::string& text, size_t size);  // as reserve, in large pages where it is large
-bool WriteFile(const std::string& path, std::string_view content, bool mustBeNew);  // replaces what stands there
+bool WriteFile(const std::string& path, std::string_view content);  // in place of what stands there, read-only or not
 bool MakeEmptyFile(const std::string& path, bool keepExisting);
 bool RemoveFile(const std::string& path);
 bool RenameFile(const std::string& from, const std::string& to);

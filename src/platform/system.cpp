@@ -144,7 +144,7 @@ int RunBatchFile(std::string path) {
   };
   replace("%TIME%", std::to_string(now.hour) + ":" + std::to_string(now.minute) + ":" + std::to_string(now.second));
   replace("%DATE%", std::to_string(now.day) + "/" + std::to_string(now.month) + "/" + std::to_string(now.year));
-  return WriteFile(target, text + "\n", false) ? 0 : 1;
+  return !IsReadOnlyFile(target) && WriteFile(target, text + "\n") ? 0 : 1;
 }
 
 }  // namespace

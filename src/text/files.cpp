@@ -78,22 +78,46 @@ bool CreateEmptyFile(const std::string& path, bool keepExisting) {
   return platform::MakeEmptyFile(Checked(path), keepExisting);
 }
 
+namespace {
+
+// The folders in which no file of a killed run is left.
+class SweptFolders {
+ public:
+  bool Add(const std::string& folder) {  // with the slash at its end; false when it is there already
+    const std::lock_guard guard(m_lock);
+    return m_folders.insert(folder).second;
+  }
+
+ private:
+  std::mutex m_lock;
+  std::unordered_set<std::string> m_folders;
+};
+
+SweptFolders sweptFolders;
+
+bool MakeDirectory(const std::string& path) {
+  if (!platform::MakeDirectory(path)) return false;
+  sweptFolders.Add(path + "/");
+  return true;
+}
+
+}  // namespace
+
 void CreateDirectories(const std::string& path, bool includeLast) {
-  Checked(path);
-  platform::FileInfo info;
-  const size_t lastSlash = path.rfind('/');
+  const size_t lastSlash = Checked(path).rfind('/');
   const std::string deepest = includeLast ? path : path.substr(0, lastSlash == std::string::npos ? 0 : lastSlash);
+  platform::FileInfo info;
   if (deepest.empty() || platform::Stat(deepest, info)) return;
   // Mostly just the last one is missing: from there back to one that can be made, then forth.
   size_t end = deepest.size();
-  while (!platform::MakeDirectory(deepest.substr(0, end))) {
+  while (!MakeDirectory(deepest.substr(0, end))) {
     const size_t slash = deepest.rfind('/', end - 1);
     if (slash == std::string::npos || slash == 0) break;
     end = slash;
   }
   while (end < deepest.size()) {
     end = std::min(deepest.find('/', end + 1), deepest.size());
-    platform::MakeDirectory(deepest.substr(0, end));
+    MakeDirectory(deepest.substr(0, end));
   }
 }
 
@@ -123,7 +147,7 @@ int64_t FileTimes::LastWriteTime(const std::string& path) {
 }
 
 std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths) {
-  constexpr size_t kFewestOfThread = 500;
+  constexpr size_t kFewestOfThread = 100;
   std::vector<int64_t> found(paths.size());
   auto read = [&](size_t begin, size_t end) {
     FileTimes times;
@@ -206,19 +230,17 @@ bool IsLeftover(std::string_view name) {
 }  // namespace
 
 std::string BesidePath(const std::string& path) {
-  static std::mutex lock;
-  static std::unordered_set<std::string> sweptFolders;
+  static const std::string kMarkOfThisProcess =
+      std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
   const std::string folder = path.substr(0, path.rfind('/') + 1);
-  if (std::lock_guard guard(lock); sweptFolders.insert(folder).second) {
+  if (sweptFolders.Add(folder)) {
     for (const std::string& name : platform::PlainFileNames(folder)) {
       if (IsLeftover(name)) platform::RemoveFile(folder + name);
     }
   }
-  const std::string mark =
-      std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
   const std::string name = path.substr(folder.size());
-  if (name.size() + mark.size() <= platform::kLongestName) return path + mark;
-  return folder + std::to_string(std::hash<std::string>()(name)) + mark;
+  if (name.size() + kMarkOfThisProcess.size() <= platform::kLongestName) return path + kMarkOfThisProcess;
+  return folder + std::to_string(std::hash<std::string>()(name)) + kMarkOfThisProcess;
 }
 
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly) {
@@ -232,7 +254,7 @@ void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarg
     platform::RemoveFile(beside);
     throw FileException(code, path);
   };
-  if (!platform::WriteFile(beside, content, false)) fail();
+  if (!platform::WriteFile(beside, content)) fail();
   if (!platform::RenameFile(beside, path)) fail();
 }
 
@@ -256,7 +278,9 @@ void WriteCheckedFile(uint32_t magic, std::string_view payload, const std::strin
   PutLittleEndian(bytes, Crc32(payload), 4);
   PutLittleEndian(bytes, payload.size(), 8);
   bytes += payload;
-  ReplaceFile(path, bytes);
+  std::string old;
+  const bool isTheSame = ReadWholeFile(old, path) && old == bytes;
+  if (!isTheSame || !TouchFile(path, false)) ReplaceFile(path, bytes);
 }
 
 // --- File

@@ -70,7 +70,8 @@ class ParallelLoop {
 }  // namespace
 
 size_t UsefulThreads(size_t work, size_t leastOfThread) {
-  return std::clamp<size_t>(work / leastOfThread, 1, std::max(1u, std::thread::hardware_concurrency()));
+  static const size_t kMost = std::max(1u, std::thread::hardware_concurrency());
+  return std::clamp<size_t>(work / leastOfThread, 1, kMost);
 }
 
 void ForEachInParallel(size_t count, const IndexedWork& begin, const IndexedWork& work) {

@@ -24,7 +24,7 @@ TEST(SystemTest, Commands) {
 TEST(SystemTest, CompilerOfTheGccFamily) {
   const std::string directory = ::testing::TempDir() + "/qrex_path";
   std::filesystem::create_directories(directory);
-  ASSERT_TRUE(WriteFile(directory + "/gcc", "#!/bin/sh\nexit 7\n", false));
+  ASSERT_TRUE(WriteFile(directory + "/gcc", "#!/bin/sh\nexit 7\n"));
   std::filesystem::permissions(directory + "/gcc", std::filesystem::perms::owner_all);
   const std::string path = std::getenv("PATH");
   SetEnvironment("PATH", directory + ":/bin:/usr/bin");
@@ -39,7 +39,7 @@ TEST(SystemTest, BatchFile) {
   const std::string path = ::testing::TempDir() + "/qrex_mark.bat", target = ::testing::TempDir() + "/qrex_mark.dep";
   std::string backslashes = path;
   for (char& c : backslashes) c = c == '/' ? '\\' : c;
-  ASSERT_TRUE(WriteFile(path, "@echo Updated %TIME% %DATE% >\"" + target + "\"\n", false));
+  ASSERT_TRUE(WriteFile(path, "@echo Updated %TIME% %DATE% >\"" + target + "\"\n"));
   EXPECT_EQ(0, RunCommand("cmd /c \"" + backslashes + "\""));
   std::string content;
   EXPECT_TRUE(ReadFile(target, content));
@@ -68,7 +68,7 @@ TEST(SystemTest, Times) {
   constexpr int64_t kTheYear2000 = 125911584000000000, kTenYears = int64_t{10} * 366 * 24 * 3600 * 10000000;
   EXPECT_GT(SystemFileTime(), kTheYear2000 + 2 * kTenYears);
   const std::string path = ::testing::TempDir() + "/qrex_time";
-  ASSERT_TRUE(WriteFile(path, "", false));
+  ASSERT_TRUE(WriteFile(path, ""));
   FileInfo info;
   ASSERT_TRUE(Stat(path, info));
   EXPECT_LT(std::abs(SystemFileTime() - info.writeTime), 100000000);
@@ -78,7 +78,7 @@ TEST(SystemTest, Times) {
 
 TEST(ErrorTest, Codes) {
   const std::string path = ::testing::TempDir() + "/qrex_error";
-  ASSERT_TRUE(WriteFile(path, "x", false));
+  ASSERT_TRUE(WriteFile(path, "x"));
   std::string content;
   EXPECT_FALSE(ReadFile(path + "none", content));
   EXPECT_EQ(2u, LastError());
@@ -86,10 +86,10 @@ TEST(ErrorTest, Codes) {
   EXPECT_EQ(3u, LastError());
   EXPECT_FALSE(ReadFile(::testing::TempDir(), content));
   EXPECT_EQ(5u, LastError());
-  EXPECT_FALSE(WriteFile(path, "y", true));
+  EXPECT_FALSE(MakeEmptyFile(path, false));
   EXPECT_EQ(80u, LastError());
   SetReadOnlyAttribute(path, true);
-  EXPECT_FALSE(WriteFile(path, "y", false));  // also for the superuser
+  EXPECT_FALSE(MakeEmptyFile(path, true));  // also for the superuser
   EXPECT_EQ(5u, LastError());
   EXPECT_FALSE(RemoveFile(path));
   SetReadOnlyAttribute(path, false);
