@@ -1,11 +1,7 @@
 #include "driver/run_workspace.h"
 
-#include <algorithm>
-#include <memory>
 #include <string>
-#include <string_view>
 #include <unordered_set>
-#include <vector>
 
 #include "build/project_builder.h"
 #include "generators/common.h"
@@ -14,7 +10,6 @@
 #include "platform/console.h"
 #include "text/files.h"
 #include "text/output_policy.h"
-#include "text/parallel.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
 #include "text/trace.h"
@@ -36,7 +31,6 @@ class WorkspaceRun {
  private:
   bool LoadWorkspaceFile(const std::string& entry);
   bool RunProjects(ScopeTimer& timer);
-  void GenerateProjects();
   void GenerateProject(Project& project);
   bool ProcessProject(Project& project);
   void Prepare(const Project& project);
@@ -149,7 +143,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
       names << project->name;
     }
     WriteIfChanged(names, m_workspace.name + ".projects");
-    GenerateProjects();
+    for (const auto& project : m_workspace.projects) GenerateProject(*project);
     GenerateWorkspace();
   } else {
     for (const auto& project : m_workspace.projects) {
@@ -182,27 +176,8 @@ bool WorkspaceRun::ProcessProject(Project& project) {
   return true;
 }
 
-// Whether no project writes a file of another: none has its name, nor its name with the prefix.
-bool WriteFilesOfTheirOwn(const std::vector<std::unique_ptr<Project>>& projects) {
-  std::unordered_set<std::string> names;
-  auto isNew = [&names](const std::string& name) { return names.insert(name).second; };
-  return std::all_of(projects.begin(), projects.end(), [&](const std::unique_ptr<Project>& project) {
-    return isNew(project->name) && (!project->usesQrex || isNew(std::string(NamePrefix(true)) + project->name));
-  });
-}
-
-void WorkspaceRun::GenerateProjects() {
-  const auto& projects = m_workspace.projects;
-  auto prepare = [&](size_t i) { Prepare(*projects[i]); };
-  auto generate = [&](size_t i) { GenerateProject(*projects[i]); };
-  if (WriteFilesOfTheirOwn(projects)) return ForEachInParallel(projects.size(), prepare, generate);
-  for (size_t i = 0; i < projects.size(); ++i) {  // the last one's files stay
-    prepare(i);
-    generate(i);
-  }
-}
-
 void WorkspaceRun::GenerateProject(Project& project) {
+  Prepare(project);
   project.CollectFiles();
   if (!project.exported) CreateMissingFiles(project);
   GenerateProjectFile(project, false);

@@ -18,10 +18,10 @@ namespace qrex {
 
 namespace {
 
-// Of the project or workspace at hand on this thread. The gcc family has one form of its files, so that the pass with
-// the prefix would compose and compare them once more.
-thread_local std::unordered_set<std::string> upToDate;
-thread_local bool isSecondPass = false;
+// Of the project or workspace at hand. The gcc family has one form of its files, so that the pass with the prefix would
+// compose and compare them once more.
+std::unordered_set<std::string> upToDate;
+bool isSecondPass = false;
 
 void BeginPass(bool buildPrefix) {
   isSecondPass = buildPrefix;

@@ -5,14 +5,13 @@
 #include <cstring>
 #include <functional>
 #include <future>
-#include <mutex>
+#include <thread>
 
 #include "platform/console.h"
 #include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
 #include "text/numbers.h"
-#include "text/parallel.h"
 
 namespace qrex {
 
@@ -80,24 +79,11 @@ bool CreateEmptyFile(const std::string& path, bool keepExisting) {
 
 namespace {
 
-// The folders in which no file of a killed run is left.
-class SweptFolders {
- public:
-  bool Add(const std::string& folder) {  // with the slash at its end; false when it is there already
-    const std::lock_guard guard(m_lock);
-    return m_folders.insert(folder).second;
-  }
-
- private:
-  std::mutex m_lock;
-  std::unordered_set<std::string> m_folders;
-};
-
-SweptFolders sweptFolders;
+std::unordered_set<std::string> sweptFolders;  // in which no file of a killed run is left; with a slash at the end
 
 bool MakeDirectory(const std::string& path) {
   if (!platform::MakeDirectory(path)) return false;
-  sweptFolders.Add(path + "/");
+  sweptFolders.insert(path + "/");
   return true;
 }
 
@@ -153,7 +139,8 @@ std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths) {
     FileTimes times;
     for (size_t i = begin; i < end; ++i) found[i] = times.LastWriteTime(paths[i]);
   };
-  const size_t threads = UsefulThreads(paths.size(), kFewestOfThread);
+  static const size_t kMostThreads = std::max(1u, std::thread::hardware_concurrency());
+  const size_t threads = std::clamp<size_t>(paths.size() / kFewestOfThread, 1, kMostThreads);
   std::vector<std::future<void>> others;
   for (size_t i = 1; i < threads; ++i) {
     others.push_back(std::async(read, paths.size() * i / threads, paths.size() * (i + 1) / threads));
@@ -233,7 +220,7 @@ std::string BesidePath(const std::string& path) {
   static const std::string kMarkOfThisProcess =
       std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
   const std::string folder = path.substr(0, path.rfind('/') + 1);
-  if (sweptFolders.Add(folder)) {
+  if (sweptFolders.insert(folder).second) {
     for (const std::string& name : platform::PlainFileNames(folder)) {
       if (IsLeftover(name)) platform::RemoveFile(folder + name);
     }

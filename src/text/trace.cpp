@@ -15,7 +15,6 @@ namespace {
 constexpr size_t kMaxPending = 16384;
 
 thread_local int64_t traceIndent = 0;
-thread_local HeldOutput* held = nullptr;
 bool stampLines = false;
 TraceHook* traceHook = nullptr;
 
@@ -113,36 +112,15 @@ bool OpenTrace(const std::string& path, bool append, bool stamp) {
 void CloseTrace() { Sink().Close(); }
 void SetTraceHook(TraceHook* hook) { traceHook = hook; }
 
-namespace {
-
-void PutTrace(std::string_view text) { held ? held->AddToTrace(text) : Sink().Write(text); }
-void PutConsole(std::string_view text) { held ? held->AddToConsole(text) : platform::WriteStdout(text); }
-
-}  // namespace
-
 void WriteToTrace(std::string_view text) {
-  if (traceIndent < 1 && !stampLines) return PutTrace(text);
-  PutTrace(WithLinePrefix(text));
+  if (traceIndent < 1 && !stampLines) return Sink().Write(text);
+  Sink().Write(WithLinePrefix(text));
 }
 
 void WriteToConsole(std::string_view text) {
-  if (platform::IsValidUtf8(text)) return PutConsole(text);
+  if (platform::IsValidUtf8(text)) return platform::WriteStdout(text);
   if (!platform::StdoutIsTerminal()) throw StringConversionException();
-  PutConsole(platform::WidenBytes(text));
-}
-
-HeldOutput::Scope::Scope(HeldOutput& output) : m_outer(held) { held = &output; }
-HeldOutput::Scope::~Scope() { held = m_outer; }
-void HeldOutput::AddToTrace(std::string_view text) { Add(true, text); }
-void HeldOutput::AddToConsole(std::string_view text) { Add(false, text); }
-
-void HeldOutput::Add(bool isTrace, std::string_view text) {
-  if (m_pieces.empty() || m_pieces.back().isTrace != isTrace) m_pieces.push_back({isTrace, std::string()});
-  m_pieces.back().text += text;
-}
-
-void HeldOutput::Write() const {
-  for (const Piece& piece : m_pieces) piece.isTrace ? PutTrace(piece.text) : PutConsole(piece.text);
+  platform::WriteStdout(platform::WidenBytes(text));
 }
 
 TraceIndentScope::TraceIndentScope(int64_t columns) : m_columns(columns) { traceIndent += columns; }

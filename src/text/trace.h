@@ -4,7 +4,6 @@
 #include <cstdint>
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace qrex {
 
@@ -21,32 +20,6 @@ void WriteToTrace(std::string_view text);  // what a TraceWriter's end calls
 
 // Writes to standard output as UTF-8 through the console writer, unbuffered by the tool.
 void WriteToConsole(std::string_view text);
-
-// What a thread wrote to trace log and console inside of a Scope, in order.
-class HeldOutput {
- public:
-  class Scope {
-   public:
-    explicit Scope(HeldOutput& output);
-    ~Scope();
-    Scope(const Scope&) = delete;
-    Scope& operator=(const Scope&) = delete;
-
-   private:
-    HeldOutput* m_outer;
-  };
-  void AddToTrace(std::string_view text);
-  void AddToConsole(std::string_view text);
-  void Write() const;  // to where it was meant for
-
- private:
-  struct Piece {
-    bool isTrace;
-    std::string text;
-  };
-  void Add(bool isTrace, std::string_view text);
-  std::vector<Piece> m_pieces;
-};
 
 class TraceIndentScope {
  public:

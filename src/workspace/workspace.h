@@ -19,7 +19,7 @@ class Workspace {
   void SortProjects();                            // subprojects first; ties keep the load order
   void SyncProjectGuids();                        // reads, applies and writes projects.guids
   bool CheckFileReferences();
-  Project* FindProjectByName(std::string_view name) const;  // or null; several threads may look
+  Project* FindProjectByName(std::string_view name) const;  // or null
   Project* FindSubproject(std::string_view path) const;     // by the path's stem; or null
   ProjectFile* FindFile(const std::string& path) const;     // by ProjectFile::path, after CheckFileReferences; or null
 
