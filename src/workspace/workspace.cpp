@@ -207,6 +207,9 @@ bool Workspace::CheckFileReferences() {
         AddStaticDefine(*project, subproject->name);
     }
   }
+  size_t fileCount = 0;
+  for (const auto& project : projects) fileCount += project->filesByPath.size();
+  fileMap.reserve(fileCount);
   for (const auto& project : projects) {
     project->CollectFiles();
     for (ProjectFile* file : project->files) {
