@@ -65,7 +65,8 @@ void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarg
 
 // A 16-byte header (magic, CRC-32 by IEEE 802.3, signed 64-bit size, all little-endian), then the payload.
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path);
-void WriteCheckedFile(uint32_t magic, std::string_view payload, const std::string& path);  // raises FileException
+// Raises FileException. A file that holds the same already is not replaced, but gets the present time.
+void WriteCheckedFile(uint32_t magic, std::string_view payload, const std::string& path);
 
 enum class FileMode { Closed = -1, ReadText, WriteText, AppendText, ReadBinary, WriteBinary, AppendBinary };
 
