@@ -83,6 +83,7 @@ class ClassHead {
  private:
   void ReadColon();
   void ReadModel();
+  void CheckReferencedModel(const ClassDef& model);
   void ComposeBase();
   bool WriteHead();
   void WriteBases();
@@ -131,6 +132,7 @@ void ClassHead::ReadModel() {
     auto* model = element.category == Category::Class ? static_cast<ClassDef*>(&element) : nullptr;
     m_def.m_referencedModel = model;
     if (!model || !model->IsPureModel()) m_parser.Fail("Not a model : " + Printed(m_parser.current));
+    CheckReferencedModel(*model);
     WriteModelMixin(m_out, m_def);
     return;
   }
@@ -141,6 +143,16 @@ void ClassHead::ReadModel() {
   ParseModelStruct(m_parser, m_def);
   m_parser.Advance();
   WriteModelMixin(m_out, m_def);
+}
+
+// A class that was only declared where the model was read may since have got a model that leads back to itself.
+void ClassHead::CheckReferencedModel(const ClassDef& model) {
+  for (const ModelField* field : model.m_modelFields) {
+    if (field->IsDropped()) continue;
+    const std::string fault =
+        ExpansionFault(field->m_type, *model.owner.rootNameSpace, Expansion::AttributeStructs, &model);
+    if (!fault.empty()) m_parser.Fail("Field " + field->m_name + " : " + fault);
+  }
 }
 
 void ClassHead::ComposeBase() {

@@ -296,8 +296,8 @@ void InterfaceStatement::ReadMembers() {
 }
 
 void InterfaceStatement::CheckAttribute(const std::string& name, const TypeCode& type) {
-  for (Follow follow : {Follow::Vectors, Follow::Elements}) {
-    const std::string fault = ExpansionFault(type, m_parser.Root(), follow, nullptr);
+  for (Expansion expansion : {Expansion::Methods, Expansion::AttributeStructs}) {
+    const std::string fault = ExpansionFault(type, m_parser.Root(), expansion, nullptr);
     if (!fault.empty()) m_parser.Fail("Attribute " + name + " : " + fault);
   }
 }

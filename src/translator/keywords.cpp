@@ -29,7 +29,7 @@ void ParseNestedClass(QrexParser& parser, ClassDef& def) {
 void ParseModelInBody(QrexParser& parser, ClassDef& def) {
   if (def.HasEmbeddedModel()) parser.Fail("Repeated model declaration");
   parser.Advance();
-  ParseModelBlock(parser, def);
+  ParseModelBlock(parser, def, Expansion::Accessors);
   parser.DropBehindCurrent();
 }
 

@@ -128,7 +128,7 @@ void ParseModelStruct(QrexParser& parser, ClassDef& def) {
   if (def.IsTemplate()) out << "template <" << def.m_templateArgList << "> ";
   out << "struct " << ExportPrefix(def) << def.ModelStructName() << "\n";
   Block body(out, ";");
-  ParseModelBlock(parser, def);
+  ParseModelBlock(parser, def, Expansion::AttributeStructs);  // a mixin goes with the struct
   out << "\n";
   WriteStructMembers(out, def);
 }

@@ -4,11 +4,13 @@
 #include "translator/byte_code.h"
 #include "translator/class_def.h"
 #include "translator/qrex_parser.h"
+#include "translator/type_expansion.h"
 
 namespace qrex {
 
 // On the `{` or the `<<` of the block; leaves it on the closing `}`. Constructor text is written while it is read.
-void ParseModelBlock(QrexParser& parser, ClassDef& def);
+// `expansion`: what will be generated of the fields.
+void ParseModelBlock(QrexParser& parser, ClassDef& def, Expansion expansion);
 
 // The whole of a model struct: heading, block (read here), members, "};\n". On the `{` or `<<`; leaves it on the `}`.
 void ParseModelStruct(QrexParser& parser, ClassDef& def);

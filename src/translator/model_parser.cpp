@@ -7,7 +7,6 @@
 #include "translator/class_parser.h"
 #include "translator/emit.h"
 #include "translator/model.h"
-#include "translator/type_expansion.h"
 
 namespace qrex {
 
@@ -15,7 +14,8 @@ namespace {
 
 class ModelBlock {
  public:
-  ModelBlock(QrexParser& parser, ClassDef& def) : m_parser(parser), m_def(def) {}
+  ModelBlock(QrexParser& parser, ClassDef& def, Expansion expansion)
+      : m_parser(parser), m_def(def), m_expansion(expansion) {}
   void Parse();
 
  private:
@@ -24,8 +24,8 @@ class ModelBlock {
     std::vector<size_t> reads;  // the arguments of its code, by index among all fields
   };
 
-  void ParseFields();
-  void CheckField(const ModelField& field);
+  void ParseFields(bool dropped);
+  void CheckField(const ModelField& field, bool dropped);
   void ParseConstructors();
   void FinishWithoutSchema();
   void ParseDropped();
@@ -45,6 +45,7 @@ class ModelBlock {
 
   QrexParser& m_parser;
   ClassDef& m_def;
+  const Expansion m_expansion;
 };
 
 size_t ModelBlock::IndexOf(std::string_view name) const {
@@ -56,7 +57,7 @@ size_t ModelBlock::IndexOf(std::string_view name) const {
 void ModelBlock::Parse() {
   if (m_parser.Accept(kShiftLeft)) ParseQualifierList(m_parser, m_def);
   m_parser.Expect(kOpenBrace, "{");
-  ParseFields();
+  ParseFields(false);
   m_def.m_numCurrentModelFields = Fields().size();
   ParseConstructors();
   if (!m_parser.Is(kDollar)) return FinishWithoutSchema();
@@ -84,7 +85,7 @@ void ModelBlock::FinishWithoutSchema() {
   if (!m_parser.Is(kCloseBrace)) m_parser.FailExpected("}");
 }
 
-void ModelBlock::ParseFields() {
+void ModelBlock::ParseFields(bool dropped) {
   const bool strict = m_def.m_reflected || m_def.IsMixin();
   while (!m_parser.Is(kDollar) && !m_parser.Is(kDollarDollar) && !m_parser.Is(kCloseBrace) &&
          !m_parser.Is("explicit")) {
@@ -96,13 +97,13 @@ void ModelBlock::ParseFields() {
     if (!m_parser.Is(kSemicolon)) {
       m_parser.Fail("; expected after field declaration when read " + Printed(m_parser.current));
     }
-    CheckField(*field);
+    CheckField(*field, dropped);
     Fields().push_back(std::move(field));
     m_parser.Advance();
   }
 }
 
-void ModelBlock::CheckField(const ModelField& field) {
+void ModelBlock::CheckField(const ModelField& field, bool dropped) {
   const bool repeats =
       IndexOf(field.m_name) < Fields().size() ||
       std::any_of(m_def.m_fields.begin(), m_def.m_fields.end(), [&](const auto& f) { return f.name == field.m_name; });
@@ -113,7 +114,8 @@ void ModelBlock::CheckField(const ModelField& field) {
   context.serialisable = m_def.m_implementsIPersistable;
   std::string message;
   if (!CheckType(field.m_type, m_parser.Root(), context, message)) m_parser.Fail(message);
-  message = ExpansionFault(field.m_type, m_parser.Root(), Follow::Elements, &m_def);
+  if (dropped) return;  // it has no accessors
+  message = ExpansionFault(field.m_type, m_parser.Root(), m_expansion, &m_def);
   if (!message.empty()) m_parser.Fail("Field " + field.m_name + " : " + message);
 }
 
@@ -143,7 +145,7 @@ void ModelBlock::ParseConstructors() {
 void ModelBlock::ParseDropped() {
   m_parser.Advance();
   m_parser.Expect(kOpenBrace, "{");
-  ParseFields();
+  ParseFields(true);
   m_parser.Expect(kCloseBrace, "}");
   if (!m_parser.Is(kDollar)) m_parser.FailExpected("$schema");
   m_parser.Advance();
@@ -312,6 +314,8 @@ void ModelBlock::CheckRedundantEvolution(const std::vector<Evolution>& evolution
 
 }  // namespace
 
-void ParseModelBlock(QrexParser& parser, ClassDef& def) { ModelBlock(parser, def).Parse(); }
+void ParseModelBlock(QrexParser& parser, ClassDef& def, Expansion expansion) {
+  ModelBlock(parser, def, expansion).Parse();
+}
 
 }  // namespace qrex

@@ -197,9 +197,29 @@ TEST_F(ModelsTest, FaultsOfTheBlock) {
       {"$model M { }\n$model N { };", 2, "; expected after definition of $model M when read $"},
       {"$model M { int32 a;\nM b; };", 2, "Field b : $model M contains itself"},
       {"$model M;\n$model N { M m[]; };\n$model M { xmap<int32, N> n; };", 3, "Field n : $model M contains itself"},
+      {"$struct S : model {\nDynArray<S> s; } { };", 2, "Field s : $struct S contains itself"},
+      {"$struct S { $model { xmap<int8, S> s; } };\n$model M { S s[2]; };", 2, "Field s : $struct S contains itself"},
+      {"$struct S;\n$model M { S s[]; };\n$struct S { $model { M m; } };\n$struct T : model M { };", 4,
+       "Field s : $model M contains itself"},
   });
-  // A vector of its own kind is no part of a model's path.
-  EXPECT_NE(TranslateHeader("$model M { xvector<M> children; };").header.find("CreateIntochildren"), std::string::npos);
+}
+
+// What of its own kind a model may hold: where accessors end, nothing repeats.
+TEST_F(ModelsTest, OfItsOwnKind) {
+  const std::pair<std::string, std::string> kModels[] = {
+      {"$model M { xvector<M> children; };", "    void CreateIntochildren(vesk::ssize_t _i,M const* _src"},
+      {"$model M { int32 v; assignable<DynArray<M> > kids; };", "    void Setkids(vesk::DynArray<M> const& _v) {"},
+      {"$model M { int32 v; $dropped { M old[]; } $schema { 1: +v +old 2: -old } };", "    vesk::int32 v;\n"},
+      {"$struct S { $model { DynArray<S> kids; xmap<string8,S> named; } };",
+       "    void SetkidsElement(vesk::ssize_t _k0,S const& _v) { kids[_k0] = _v; }\n"},
+      {"$struct S { $model { DynArray<S> kids; } };\n$model M { S s; xvector<S> v; };", "void Sets(S const& _v) {"},
+      {"$model M { int32 v; assignable<xvector<M> > kids; };\n$interface I { M a; };",
+       "vesk::xvector<M> (__stdcall *Getakids)(void const* _self);\n"},
+  };
+  for (const auto& [text, expected] : kModels) {
+    const std::string header = TranslateHeader(text).header;
+    EXPECT_NE(header.find(expected), header.npos) << text << "\n" << header;
+  }
 }
 
 TEST_F(ModelsTest, FaultsOfTheSchema) {
