@@ -31,13 +31,21 @@ bool ClassDef::HaveSomethingToRegister() const {
          (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
 }
 
+// What the record names, in its order: the fields of the mixins stand in it behind the class's own.
 void ClassDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
-  NameSpace& root = *owner.rootNameSpace;
-  for (const ClassField& field : m_fields) {
-    if (field.reflected) CollectNamedTypes(field.type, root, out);
+  std::vector<const ClassDef*> sources = {this};
+  sources.insert(sources.end(), m_mixins.begin(), m_mixins.end());
+  for (const ClassDef* source : sources) {
+    for (const ClassField& field : source->m_fields) {
+      if (field.reflected) CollectNamedTypes(field.type, *source->owner.rootNameSpace, out);
+    }
   }
-  for (const ModelField* field : m_modelFields) CollectNamedTypes(field->m_type, root, out);
-  for (const FunctionSignature& method : m_methods) CollectNamedTypes(method, root, out);
+  for (const ClassDef* source : sources) {
+    for (const ModelField* field : source->m_modelFields) {
+      CollectNamedTypes(field->m_type, *source->owner.rootNameSpace, out);
+    }
+  }
+  for (const FunctionSignature& method : m_methods) CollectNamedTypes(method, *owner.rootNameSpace, out);
 }
 
 bool ClassDef::ContainsMetaData() const {

@@ -134,6 +134,15 @@ TEST_F(NameSpaceTest, Warnings) {
        "t.h(1) : see declaration of $struct A\n"},
       {"$struct A; $struct+ R { }; $struct+ B { $A* a; $R r; }; $struct C <<reflect -reflect>> { $A* a; };", ""},
       {"$struct A { }; $struct+ B { $indep -A a; };", ""},
+      {"$enum E { a };\n$enum F { b };\n$mixin M <<reflect>> { $E e; };\n$mixin N : model { F f; } { };\n"
+       "$struct+ B : mixin [ N M ] { };",
+       "t.h(3) : warning W1002 : Reflected $mixin M references non-registered $enum E\n"
+       "t.h(1) : see declaration of $enum E\n"
+       "t.h(5) : warning W1002 : Reflected $struct+ B references non-registered $enum E\n"
+       "t.h(1) : see declaration of $enum E\n"
+       "t.h(5) : warning W1002 : Reflected $struct+ B references non-registered $enum F\n"
+       "t.h(2) : see declaration of $enum F\n"},
+      {"$enum E { a }; $mixin M { $E e; }; $struct+ B : mixin [ M ] { };", ""},
       {"$interface I\n{ };\n$struct A isa I { };",
        "t.h(3) : warning W1003 : isa on $interface I doesn't inherit from IObject\n"
        "t.h(1) : see declaration of $interface I\n"
