@@ -147,8 +147,9 @@ bool ClassDef::CanSerialiseEmbeddedModel() const {
 }
 
 bool ClassDef::WriteInsertionExtractionInTermsOfSerialise() const {
-  return qualifiers.ar == TriState::On || (!IsMixin() && CanSerialiseEmbeddedModel()) ||
-         (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
+  if (qualifiers.ar == TriState::On) return true;
+  if (IsMixin()) return false;
+  return CanSerialiseEmbeddedModel() || (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
 }
 
 std::string ClassDef::ModelStructName() const { return IsPureModel() && !m_isAnonymous ? name : name + "_model"; }

@@ -71,6 +71,18 @@ TEST_F(MixinsTest, RecordOfAClassWithMixins) {
             "            { \"z\", offsetof(K,_model_.z), K_z, 0, -1 },\n");
 }
 
+// A mixin is no type that an archive takes, unless it asks for it.
+TEST_F(MixinsTest, ArchiveFunctionsOverANamedModel) {
+  const std::string header = TranslateHeader(
+                                 "$model R { int32 a; };\n$mixin M : model R { };\n$mixin A << ar >> : model R { };\n"
+                                 "$struct K : model R { };\n")
+                                 .header;
+  for (const auto& [name, isWritten] : {std::pair("M", false), {"A", true}, {"K", true}}) {
+    const bool found = header.find("(Archive& _ar," + std::string(name) + " const& _x)") != header.npos;
+    EXPECT_EQ(found, isWritten) << name << "\n" << header;
+  }
+}
+
 TEST_F(MixinsTest, AdtAndItsImplementation) {
   MakeWorld(TargetType::DynamicLinkLibrary);
   const std::string adt = "$adt+ A : [ 7 ] { int32 get(int32 i) const; void set(const string8& s); };\n";
