@@ -155,6 +155,7 @@ void CachedFunction::WriteCalculation() {
   WriteSignature(m_out, calculation);
   m_out << "\n";
   CopyCodeBlock(m_parser, m_def);
+  m_out << "\n";
 }
 
 // --- Keys: one parameter is its own key, several are nested pairs.

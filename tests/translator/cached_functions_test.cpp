@@ -13,6 +13,7 @@ TEST_F(CachedFunctionsTest, Plain) {
     return 1; 
 }
 
+
 struct _depnode_f : public vesk::DGSyncDepNode<_depnode_f,S,vesk::int32>
 {
     typedef vesk::DGSyncDepNode<_depnode_f,S,vesk::int32> base;
@@ -46,6 +47,7 @@ TEST_F(CachedFunctionsTest, AsyncByReferenceWithInputInMixin) {
 void _calc_f(vesk::xvector<vesk::int32>& out,vesk::string8 in) const
 { }
 
+
 struct _depnode_f : public vesk::DGAsyncNodeOnInput<_depnode_f,M,vesk::string8,vesk::xvector<vesk::int32>>
 {
     typedef vesk::DGAsyncNodeOnInput<_depnode_f,M,vesk::string8,vesk::xvector<vesk::int32>> base;
@@ -77,6 +79,7 @@ TEST_F(CachedFunctionsTest, AsyncKeyedByOne) {
   EXPECT_EQ(R"(vesk::int32 _calc_f(vesk::string8 const& k="") const
 { }
 
+
 struct _depnode_f : public vesk::DGKeyedAsyncIndepNode<_depnode_f,M,vesk::string8,vesk::int32>
 )",
             Section(text, "", "{\n    typedef"));
@@ -104,6 +107,7 @@ TEST_F(CachedFunctionsTest, KeyedBySeveralByReference) {
   EXPECT_EQ(
       R"~(void _calc_f(bool& out,vesk::int32 a,vesk::string8 const& b,vesk::float64 c) const
 { }
+
 
 struct _depnode_f : public vesk::DGKeyedSyncDepNode<_depnode_f,S,std::pair<vesk::int32,std::pair<vesk::string8,vesk::float64>>,bool>
 {
