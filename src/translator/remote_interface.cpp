@@ -116,9 +116,9 @@ void RemoteText::WriteFactory(std::string_view kind) {
             "    static $0$1Factory s;\n"
             "}\n",
             {kind, m_name});
-  std::string name;
-  for (const NameSpace* scope : EnclosingNameSpaces(m_interface.parent)) name += scope->name + "::";
-  m_interface.owner.registerNames.push_back(name + std::string(kind) + m_name);
+  std::string scope = m_interface.parent->GetQualifiedName();
+  if (!scope.empty()) scope += "::";
+  m_interface.owner.registerNames.push_back(scope + std::string(kind) + m_name);
 }
 
 void RemoteText::WriteStub() {

@@ -49,6 +49,12 @@ TEST_F(RemoteTest, WithoutReflection) {
             "\n//### Registration of stub/scion of $interface J\nstruct StubJ : vesk::Stub\n{\n");
 }
 
+TEST_F(RemoteTest, InAnUnnamedNameSpace) {
+  TranslateHeader("namespace { $interface ipc J { }; namespace n { $interface rmi K { }; } }\n");
+  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
+            (std::vector<std::string>{"StubJ", "ScionJ", "n::StubK", "n::SkeletonK"}));
+}
+
 TEST_F(RemoteTest, Faults) {
   const std::vector<ErrorCase> cases = {
       {"void f(int32 a);", 2, "[in] or [out] expected when read int32"},
