@@ -107,11 +107,9 @@ void NodeField::ReadHead() {
   const NodeHead head = ReadNodeHead(m_parser, m_def);
   if (head.hard && m_isIndep) throw LexScannerException("^ not permitted on $indep", m_parser.previous);
   if (m_parser.Accept(kShiftLeft)) ReadVisitQualifier();
-  FunctionArg arg;
-  if (m_isIndep && !m_parser.Is(kIdentifier) && !m_parser.Is(kColonColon)) m_parser.Fail("Syntax error");
-  m_parser.ParseFunctionArg(arg, false, head.reflected);
-  m_name = arg.name;
-  m_type = arg.type;
+  if (!m_parser.ParseTypeWithName(m_type, &m_name, true, nullptr, head.reflected)) {
+    m_parser.Fail(m_isIndep ? "Syntax error" : "Type expected when read " + Printed(m_parser.current));
+  }
   m_storage = "_" + m_name + "_";
   m_isVoid = !m_type.empty() && m_type.front() == static_cast<char>(kOpVoid);
   if (m_isVoid && m_isIndep) m_parser.Fail("void not permitted on $indep");

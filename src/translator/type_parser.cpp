@@ -150,10 +150,7 @@ void QrexParser::CheckPlatformDependent() const {
 bool QrexParser::ParseSuffixedType(TypeCode& type, bool reflected) {
   const bool leadingConst = AcceptWord("const");
   TypeCode base;
-  if (!ParseBaseType(base, reflected)) {
-    if (leadingConst) Fail("Type expected when read " + Printed(current));
-    return false;
-  }
+  if (!ParseBaseType(base, reflected)) return false;
   if (leadingConst) base.insert(0, 1, static_cast<char>(kOpConst));
   for (;;) {
     if (Accept(kStar)) {
@@ -215,7 +212,7 @@ TypeCode QrexParser::ParseArraySuffix() {
     return code;
   }
   const int64_t size = ReadInt64();
-  if (size <= 0) Fail("Array size must be greater than zero");
+  if (size <= 0 || static_cast<int32_t>(size) <= 0) Fail("Array size must be greater than zero");
   Expect(kCloseBracket, "]");
   code += static_cast<char>(kOpArray);
   AppendInt32(code, static_cast<uint32_t>(size));

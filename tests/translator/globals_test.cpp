@@ -122,6 +122,7 @@ TEST_F(GlobalsTest, VariableErrors) {
   AssertErrors({
       {"$var <<\nextern>> int32 v;", 2, "Unrecognised qualifier << extern >> on $typedef"},
       {"$var <<register -reflect>>\n7;", 2, "Variable declaration expected when read 7"},
+      {"$var const\n5 v;", 2, "Variable declaration expected when read 5"},
       {"$var int32;", 1, "Expected identifier after int32 when read ;"},
       {"$var int32 v;\n$var int32 v;", 2, "$var v conflicts with previous declaration of $var v"},
       {"$var\nint32 v =\n1", 2, "Missing semicolon after definition of variable v"},

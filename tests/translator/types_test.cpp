@@ -95,6 +95,7 @@ TEST_F(TypesTest, Codes) {
       {"::n::T", "22 04 6e 3a 3a 54"},
       {"vesk::IObject*", "35 21 0d 76 65 73 6b 3a 3a 49 4f 62 6a 65 63 74"},
       {"int32 x[3][2*2]", "50 03 00 00 00 50 04 00 00 00 04"},
+      {"int32 x[65536*65536+3]", "50 03 00 00 00 04"},
       {"K x[][256]", "49 50 00 01 00 00 20 01 4b"},
       {"int32 : [7] x", "e1 a2 07 00 00 00 04"},
       {"int32 : [true] * : [false] x", "e1 a1 00 35 e1 a1 01 04"},
@@ -128,6 +129,7 @@ TEST_F(TypesTest, Faults) {
   };
   const Texts cases = {
       {"1", "no type"},
+      {"const 1", "no type"},
       {"int x", "Can't accept platform dependent type: int"},
       {"const unsigned x", "Can't accept platform dependent type: unsigned"},
       {"__int64 x", "Can't accept platform dependent type: __int64"},
@@ -137,12 +139,15 @@ TEST_F(TypesTest, Faults) {
       {"int32 1", "Expected identifier after int32 when read 1"},
       {"xvector int32", "Expected < after xvector when read int32"},
       {"xvector<1>", "Syntax error : 1"},
+      {"xvector<const 5>", "Syntax error : 5"},
       {"xmap<int32 int32>", "Expected , after int32 when read int32"},
       {"xmap<int32,>", "Syntax error : >"},
       {"xset<int32;", "Expected > after int32 when read ;"},
       {"int32& x[2]", "Unexpected '[' : arrays on reference type are illegal"},
       {"int32 x[0]", "Array size must be greater than zero"},
       {"int32 x[1-2]", "Array size must be greater than zero"},
+      {"int32 x[65536*32768]", "Array size must be greater than zero"},
+      {"int32 x[65536*65536]", "Array size must be greater than zero"},
       {"int32 x[2;", "Expected ] after 2 when read ;"},
       {"int32 x : 1", "Expected [ after : when read 1"},
   };
@@ -194,6 +199,7 @@ TEST_F(TypesTest, Signatures) {
   const Texts cases = {
       {"1", "Function name expected when read 1"},
       {"int32 1", "Function name expected when read 1"},
+      {"const (int32 a)", "Function name expected when read ("},
       {"int32 f;", "Expected ( after f when read ;"},
       {"int32 f([E e])", "'[' unexpected.  Polymorphic argument not allowed here"},
       {"int32 f(int32)", "Expected identifier after int32 when read )"},
