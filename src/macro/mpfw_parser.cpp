@@ -118,6 +118,7 @@ void MpfwParser::ReadNamedPath(const std::string& name, std::string& out) {
 
 bool MpfwParser::ParseImportStatement() {
   if (current.kind != kAt) return false;
+  m_importBegin = current.text.begin;
   Advance();
   if (!current.Is("import")) throw LexScannerException("Syntax error: @" + Printed(current), current);
   Advance();
@@ -130,14 +131,15 @@ bool MpfwParser::ParseImportStatement() {
 }
 
 // A file that several texts import was loaded, and expanded, for each of them; the one wanted here follows its
-// importer.
+// importer. A statement that the macro layer did not see loads nothing: it means the file as an earlier one loaded it.
 MpfwSourceFile* MpfwParser::FindLoaded(const std::string& path) const {
   const auto& files = context.sourceFiles;
+  auto isWanted = [&](const auto& candidate) { return EqualIgnoringCase(candidate->path, path); };
   auto importer = std::find_if(files.begin(), files.end(), [&](const auto& file) {
     return TextRange(std::string_view(file->expansion)).Contains(current.text.begin);
   });
-  auto file = std::find_if(importer == files.end() ? files.begin() : importer + 1, files.end(),
-                           [&](const auto& candidate) { return EqualIgnoringCase(candidate->path, path); });
+  auto file = std::find_if(importer == files.end() ? importer : importer + 1, files.end(), isWanted);
+  if (file == files.end()) file = std::find_if(files.begin(), files.end(), isWanted);
   return file == files.end() ? nullptr : file->get();
 }
 
@@ -161,7 +163,7 @@ bool MpfwParser::ParseVariableStatement(std::string* name, std::string* value) {
 }
 
 void MpfwParser::ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*parse)(MpfwParser& parser)) {
-  if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", current);
+  if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", m_importBegin);
   parser.m_importDepth = m_importDepth + 1;
   const TextRange expansion{std::string_view(file.expansion)};
   const LexToken leftover = [&] {
@@ -173,11 +175,11 @@ void MpfwParser::ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*
       MapErrorPosition(file.map, expansion, exception);
       TraceWriter trace;
       ReportParseError(context.sourceFiles, trace, exception);
-      throw LexScannerException("while processing @import of " + file.path, current);
+      throw LexScannerException("while processing @import of " + file.path, m_importBegin);
     }
   }();
   if (leftover.kind != kEndOfText) {
-    throw LexScannerException("Syntax error when read '" + Printed(leftover) + "' in " + file.path, current);
+    throw LexScannerException("Syntax error when read '" + Printed(leftover) + "' in " + file.path, m_importBegin);
   }
 }
 

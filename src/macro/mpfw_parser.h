@@ -71,6 +71,7 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
 
   static constexpr int kMaxImportDepth = 200;  // a file may import itself
   int m_importDepth = 0;
+  const char* m_importBegin = nullptr;  // the `@` of the import statement at hand
 };
 
 }  // namespace qrex

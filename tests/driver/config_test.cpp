@@ -144,7 +144,7 @@ TEST_F(ConfigTest, Imports) {
   EXPECT_EQ("two|_m_", Got().platform + "|" + Got().config);
   EXPECT_EQ(RunMode::Gen, Got().mode);
   Write("bad", "\nmode = bad");
-  AssertFails("\n\n@import \"bad\"",
+  AssertFails("\n\n@import\n\"bad\"",
               "\nbad(2) : Invalid option : bad\n\nmain.qrex(3) : while processing @import of bad\n");
 }
 

@@ -19,7 +19,9 @@ class MpfwParserTest : public ::testing::Test, public TraceHook {
       found = root + "/" + path;
       return path == "missing" || FileExists(found);
     }
-    void OnImportedFile(MpfwSourceFile& file) override { imported += file.path.substr(root.size() + 1) + ";"; }
+    void OnImportedFile(MpfwSourceFile& file) override {
+      imported += file.path.substr(root.size() + 1) + (file.expansion.empty() ? "" : " " + file.expansion) + ";";
+    }
     std::string root, imported;
   };
 
@@ -137,6 +139,21 @@ TEST_F(MpfwParserTest, Statements) {
   EXPECT_EQ("Syntax error: @x", import("@x"));
   EXPECT_EQ("Expected quoted string when read x", import("@import x"));
   EXPECT_EQ("Couldn't open file none", import("@import \"none\""));
+
+  // In a loaded file, the one behind it goes ahead of one that was loaded earlier.
+  AddFile("b", "@quote(@import \"A\")");
+  Load("b");
+  const MpfwSourceFile& importer = *sources.back();
+  const auto importedBy = [&] {
+    parser.imported.clear();
+    parser.SetInput(TextRange(std::string_view(importer.expansion)));
+    return parser.ParseImportStatement() ? parser.imported : "no";
+  };
+  AddFile("A", "");
+  EXPECT_EQ("a;", importedBy());
+  AddFile("a", "again");
+  Load("a");
+  EXPECT_EQ("a again;", importedBy());
 
   const auto define = [&](const std::string& text) {
     return With(text, [&] {

@@ -302,7 +302,7 @@ TEST_F(ProjectTest, Imports) {
       "\ntree/app/src/app.qrpj(4) : while processing @import of more/inc\n",
       trace);
   Write("more/inc", "qrex\n{ }");
-  AssertError(std::string(kHeads) + "@import \"inc\"\n{ }", "(3) : Syntax error when read '{' in more/inc");
+  AssertError(std::string(kHeads) + "@import\n\"inc\"\n{ }", "(3) : Syntax error when read '{' in more/inc");
 }
 
 }  // namespace
