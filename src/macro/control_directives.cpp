@@ -83,22 +83,26 @@ void ExpansionContext::Scope() {
   ExpandBlock(block, child, indent, CurrentColumn());
 }
 
-// Python minds indentation: that of the first statement goes from every line, wherever the braces stand.
-static void UnindentFirstLine(TextRange& block, int& indent) {
+// Python minds indentation: that of the first statement goes from every line, wherever the braces stand. Answers how
+// many blank lines stood ahead of it.
+static size_t SkipToFirstStatement(TextRange& block, int& indent) {
+  size_t lines = 0;
   int columns = 0;
   for (; !block.Empty() && std::string_view(" \t\n").find(*block.begin) != std::string_view::npos; ++block.begin) {
+    if (*block.begin == '\n') ++lines;
     columns = *block.begin == '\n' ? 0 : columns + (*block.begin == '\t' ? kTabWidth : 1);
     indent = columns;
   }
+  return lines;
 }
 
 void ExpansionContext::RunPython() {
   LexScanner scanner = m_scanner;
   int indent;
   TextRange block = ReadBraceBlock(scanner, indent);
-  UnindentFirstLine(block, indent);
+  const size_t blankLines = SkipToFirstStatement(block, indent);
   if (!block.Empty()) {
-    const std::string code = ExpandPart(block, indent) + "\n";
+    const std::string code = std::string(blankLines, '\n') + ExpandPart(block, indent) + "\n";  // Python counts lines
     try {
       qrex::RunPython("", code, m_tokenText.begin);
     } catch (LexScannerException& exception) {

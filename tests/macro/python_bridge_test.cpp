@@ -112,6 +112,12 @@ TEST_F(PythonTest, ErrorsOfDirectivesNameThem) {
   EXPECT_EQ(Expand("@runpython { 1 / 0 }"),
             "RunPython error: Traceback (most recent call last):\n  File \"\", line 1, in <module>\n    \n"
             "ZeroDivisionError: integer division or modulo by zero\n\n    in @runpython()\n");
+  // Python counts the lines as they are written, from the one behind the brace.
+  for (const auto& [block, line] : {std::pair{"@runpython {\n\n  \n    x = 1\n    1 / 0\n}", "line 4,"},
+                                    {"@runpython\n{\n\n    if 1:\n        1 / 0\n}", "line 3,"},
+                                    {"@runpython {  \n1 / 0 }", "line 2,"}}) {
+    EXPECT_NE(Expand(block).find(line), std::string::npos) << Expand(block);
+  }
   EXPECT_EQ(Expand("@defpython nothing(x) = None\nnothing(1)"),
             "Can't convert python result of type NoneType\n    invoking python macro nothing\n"
             "    invoking macro nothing(x) with x=1");
