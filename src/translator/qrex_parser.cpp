@@ -179,7 +179,7 @@ void QrexParser::Dispatch() {
     if (!keyword.advancesItself) Advance();
     return;
   }
-  Fail("'$" + current.text.Text() + "' is not a valid directive");
+  Fail("'$" + Printed(current) + "' is not a valid directive");
 }
 
 bool QrexParser::Accept(int32_t kind) {
