@@ -125,7 +125,7 @@ void ClassStatement::ParseForward() {
   if (m_exported) m_parser.ReportWarning(1017, "+ on forward declaration of " + m_name + " deprecated");
   WriteForwardDeclaration(m_out, *m_def);
   m_def->status = DeclStatus::Forward;
-  if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
+  m_parser.EnterForward(std::move(m_made), m_old, m_enclosing);
   m_parser.Flush();
   m_parser.DropBehindCurrent();
 }

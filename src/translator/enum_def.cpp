@@ -159,7 +159,7 @@ void EnumStatement::ParseForward() {
   } else {
     m_parser.out << "enum " << m_def->name << " : int;\n";
   }
-  if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
+  m_parser.EnterForward(std::move(m_made), m_old, m_enclosing);
   m_parser.Flush();
   m_parser.DropBehindCurrent();
 }

@@ -231,7 +231,7 @@ void InterfaceStatement::MakeElement() {
 
 void InterfaceStatement::ParseForward() {
   m_parser.out << "struct " << m_def->name << ";\n";
-  if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
+  m_parser.EnterForward(std::move(m_made), m_old, m_enclosing);
   m_parser.Flush();
   m_parser.DropBehindCurrent();
 }
@@ -314,10 +314,10 @@ void InterfaceStatement::WriteText() {
 
 // So that the mixin list of a class can name it.
 void InterfaceStatement::AddDelegatorMixin() {
-  if (m_enclosing) return;
   auto mixin = std::make_unique<ClassDef>(m_parser.file, m_def->position, ClassKind::Mixin);
   mixin->name = m_def->name + "DelegatorMixin";
   mixin->status = DeclStatus::Defined;
+  mixin->m_nested = m_def->m_nested;
   m_parser.Current().Add(std::move(mixin));
 }
 

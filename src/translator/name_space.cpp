@@ -48,6 +48,12 @@ bool Symbol::HasNameSpace(const IndexSet& files) const {
   return (m_newest && counts(m_newest)) || std::any_of(m_declared.begin(), m_declared.end(), counts);
 }
 
+bool Symbol::IsDeclaredIn(const IndexSet& files) const {
+  auto counts = [&](const NameSpaceElement* element) { return files.Has(element->owner.index); };
+  return (m_newest && counts(m_newest)) || std::any_of(m_declared.begin(), m_declared.end(), counts) ||
+         std::any_of(m_forward.begin(), m_forward.end(), counts);
+}
+
 NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) const {
   NameSpaceElement* result = own;
   auto consider = [&](NameSpaceElement* element) {
@@ -73,24 +79,19 @@ NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) c
   return result;
 }
 
-const Symbol* SymbolIndex::Find(std::string_view qualifiedName) const {
-  auto found = m_symbols.find(qualifiedName);
+const Symbol* SymbolIndex::Find(std::string_view key) const {
+  auto found = m_symbols.find(key);
   return found == m_symbols.end() ? nullptr : &found->second;
 }
 
 // --- Name spaces
 
 NameSpace::NameSpace(ScannedFile& owner, NameSpace* parent, std::string name)
-    : NameSpaceElement(owner, nullptr, Category::NameSpace) {
+    : NameSpaceElement(owner, nullptr, Category::NameSpace),
+      m_keyPrefix(parent ? parent->m_keyPrefix + name + "::" : std::string()) {
   this->name = std::move(name);
   this->parent = parent;
   status = DeclStatus::Defined;
-}
-
-std::string NameSpace::KeyOf(std::string_view elementName) const {
-  std::string key = GetQualifiedName();
-  if (!IsRoot()) key += "::";
-  return key.append(elementName);
 }
 
 bool NameSpace::HaveSomethingToRegister() const {
@@ -104,7 +105,7 @@ void NameSpace::WriteReflection(TextWriter& out, RegistrationLists& lists) {
 
 const Symbol* NameSpace::FindSymbol(std::string_view elementName) const {
   const SymbolIndex& symbols = owner.host.Symbols();
-  return IsRoot() ? symbols.Find(elementName) : symbols.Find(KeyOf(elementName));
+  return IsRoot() ? symbols.Find(elementName) : symbols.Find(m_keyPrefix + std::string(elementName));
 }
 
 NameSpaceElement* NameSpace::LookupLocal(std::string_view elementName) {
@@ -132,6 +133,12 @@ NameSpaceElement* NameSpace::LookupPath(std::string_view path) {
   return scope->Lookup(path);
 }
 
+bool NameSpace::Sees(std::string_view elementName) const {
+  if (m_elements.contains(elementName)) return true;
+  const Symbol* symbol = FindSymbol(elementName);
+  return symbol && symbol->IsDeclaredIn(owner.mounted);
+}
+
 NameSpace* NameSpace::FindOrCreateNameSpace(std::string_view elementName) {
   auto found = m_elements.find(elementName);
   if (found == m_elements.end()) {
@@ -144,7 +151,7 @@ NameSpaceElement& NameSpace::Add(std::unique_ptr<NameSpaceElement> element) {
   element->parent = this;
   NameSpaceElement& added = *element;
   std::unique_ptr<NameSpaceElement>& slot = m_elements[added.name];
-  Symbol& symbol = owner.host.Symbols().Enter(KeyOf(added.name));
+  Symbol& symbol = owner.host.Symbols().Enter(m_keyPrefix + added.name);
   if (slot) {
     symbol.Remove(*slot);
     m_replaced.push_back(std::move(slot));

@@ -77,7 +77,7 @@ class NameSpaceElement {
   mutable std::string m_qualifiedName;
 };
 
-// All declarations of one qualified name in a build. What is only forward declared may stand in hundreds of files and
+// All declarations of one name in a build. What is only forward declared may stand in hundreds of files and
 // never conflicts: it is kept apart, so that a look-up reads the few declarations that say more. The status of an
 // element moves only while its own statement is read, so the newest one is sorted in when the next of its name comes.
 class Symbol {
@@ -85,6 +85,7 @@ class Symbol {
   void Enter(NameSpaceElement& element);
   void Remove(const NameSpaceElement& element);
   bool HasNameSpace(const IndexSet& files) const;
+  bool IsDeclaredIn(const IndexSet& files) const;
   // The declaration that counts for a file that sees `files` and holds `own` (or null) itself; or null. Throws
   // "Ambiguous identifier : ".
   NameSpaceElement* Choose(NameSpaceElement* own, const IndexSet& files) const;
@@ -96,11 +97,12 @@ class Symbol {
   uint32_t m_categories = 0;  // a bit for each category that was entered
 };
 
-// Every declaration of the build by qualified name, kept by NameSpace::Add.
+// Every declaration of the build, kept by NameSpace::Add. The key is the path of name spaces and the name. It differs
+// from the qualified name inside unnamed name spaces: `b` in one of them is not the `b` beside it.
 class SymbolIndex {
  public:
-  Symbol& Enter(const std::string& qualifiedName) { return m_symbols[qualifiedName]; }
-  const Symbol* Find(std::string_view qualifiedName) const;  // or null
+  Symbol& Enter(const std::string& key) { return m_symbols[key]; }
+  const Symbol* Find(std::string_view key) const;  // or null
 
  private:
   struct Hash {
@@ -126,6 +128,7 @@ class NameSpace : public NameSpaceElement {
   NameSpaceElement* LookupLocal(std::string_view name);  // own map, with the name spaces that imports bring
   NameSpaceElement* Lookup(std::string_view name);       // with mounted name spaces; throws "Ambiguous identifier : "
   NameSpaceElement* LookupPath(std::string_view path);   // a::b::c
+  bool Sees(std::string_view name) const;                // does anything of that name stand here; never ambiguous
   template <typename T>
   T* LookupKind(std::string_view name, Category kind) {
     NameSpaceElement* element = Lookup(name);
@@ -138,8 +141,8 @@ class NameSpace : public NameSpaceElement {
   const std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>>& Elements() const { return m_elements; }
 
  private:
-  std::string KeyOf(std::string_view name) const;
   const Symbol* FindSymbol(std::string_view name) const;  // or null
+  const std::string m_keyPrefix;  // "a::b::", where an unnamed name space, too, is a part: "::" at file level
   std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>> m_elements;
   std::vector<std::unique_ptr<NameSpaceElement>> m_replaced;  // earlier declarations: others may still refer to them
 };

@@ -93,6 +93,12 @@ void QrexParser::Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* encl
   }
 }
 
+void QrexParser::EnterForward(std::unique_ptr<NameSpaceElement> element, const NameSpaceElement* old,
+                              const ClassDef* enclosing) {
+  const bool isKnown = enclosing ? Current().Sees(element->name) : old != nullptr;
+  if (!isKnown) Current().Add(std::move(element));
+}
+
 void QrexParser::RequireSemicolonAfter(const NameSpaceElement& element) {
   if (Is(kSemicolon)) return;
   Fail("; expected after definition of " + PrintedElement(element) + " when read " + Printed(current));

@@ -88,6 +88,9 @@ class QrexParser : public ExpressionParser {
   [[noreturn]] void FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element);
   // Into the current name space, or into the class that encloses it.
   void Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* enclosing);
+  // A forward declaration stands in the current name space, also from a class body, unless a thing of its name does
+  // already. `old` is what the look-up of one that is not nested found.
+  void EnterForward(std::unique_ptr<NameSpaceElement> element, const NameSpaceElement* old, const ClassDef* enclosing);
   void RequireSemicolonAfter(const NameSpaceElement& element);  // "; expected after definition of ..."
   void SeeDeclaration(const NameSpaceElement& element);
   void RequireIObjectImport();  // "@import of IObject.h required"

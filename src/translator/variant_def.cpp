@@ -253,7 +253,7 @@ void VariantStatement::Parse() {
   ReadHeading();
   if (m_parser.Is(kSemicolon)) {
     m_parser.out << "class " << m_def->name << ";\n";
-    if (!m_old) m_parser.Enter(std::move(m_made), m_enclosing);
+    m_parser.EnterForward(std::move(m_made), m_old, m_enclosing);
     m_parser.Flush();
     return m_parser.DropBehindCurrent();
   }

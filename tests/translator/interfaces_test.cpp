@@ -107,6 +107,11 @@ TEST_F(InterfacesTest, Nested) {
   EXPECT_EQ(Section(header, "class C\n{\n", "        void (__stdcall"), "    struct I\n{\n    struct FnTable\n    {\n");
   EXPECT_EQ(Section(header, "{ BC::GetI().f(); }\n", "\npublic"), "};\n\n    int x;\n");
   EXPECT_EQ(header.find("TypeTraits<I>"), header.npos);
+  EXPECT_EQ(Section(TranslateHeader("$class C {\n$interface I { void f(); };\n"
+                                    "$struct N : mixin [ IDelegatorMixin ] { I GetI(); };\n};")
+                        .header,
+                    "struct N", "\n"),
+            " : public IDelegatorMixin<vesk::BaseMixin<N,vesk::EmptyBase> >");
 }
 
 TEST_F(InterfacesTest, ClassThatImplementsADerivedInterface) {

@@ -24,18 +24,18 @@ using LookUp = NameSpaceTest;
 
 TEST_F(LookUp, CurrentNameSpaceThenRoot) {
   const std::string names = "$struct R { }; namespace a { $struct A { }; namespace b { $struct B { }; } }\n";
-  for (const std::string use : {"$type R;", "namespace a { namespace b { $type R; $type B; $type a::A; } }",
-                                "namespace a { $type A; $type b::B; $type ::R; $type a::b::B; }"}) {
+  for (const std::string use : {"$type+ R;", "namespace a { namespace b { $type+ R; $type+ B; $type+ a::A; } }",
+                                "namespace a { $type+ A; $type+ b::B; $type+ ::R; $type+ a::b::B; }"}) {
     EXPECT_EQ("", Fault(names + use)) << use;
     MakeWorld(TargetType::Application);
   }
   AssertErrors({
-      {names + "namespace a { namespace b { $type A; } }", 2, "Unrecognised identifier : A"},
-      {names + "$type A;", 2, "Unrecognised identifier : A"},
-      {names + "namespace a { $type ::A; }", 2, "Unrecognised identifier : A"},
-      {names + "$type a::R;", 2, "Unrecognised identifier : R"},
-      {names + "$type R::x;", 2, ":: not expected here : $struct R is not a namespace"},
-      {names + "$type a::\n1;", 3, "Expected identifier after :: when read 1"},
+      {names + "namespace a { namespace b { $type+ A; } }", 2, "Unrecognised identifier : A"},
+      {names + "$type+ A;", 2, "Unrecognised identifier : A"},
+      {names + "namespace a { $type+ ::A; }", 2, "Unrecognised identifier : A"},
+      {names + "$type+ a::R;", 2, "Unrecognised identifier : R"},
+      {names + "$type+ R::x;", 2, ":: not expected here : $struct R is not a namespace"},
+      {names + "$type+ a::\n1;", 3, "Expected identifier after :: when read 1"},
       {names + "$struct K isa R { };", 2, "$interface identifier expected when read $struct R"},
       {names + "$struct K isa a::A::x { };", 2, ":: not expected here : $struct a::A is not a namespace"},
       {names + "$struct K isa a::none { };", 2, "Unrecognised identifier : none"},
@@ -46,14 +46,15 @@ TEST_F(LookUp, CurrentNameSpaceThenRoot) {
 TEST_F(LookUp, ImportsAreSeenThroughImports) {
   AddHeader("a.h", "namespace n { namespace m { $struct A { }; } }");
   AddFile("b.h", "@import \"a.h\"\nnamespace n { $struct B { }; }");
-  EXPECT_EQ("",
-            Fault("@import \"b.h\"\n$type n::m::A; namespace n { $type m::A; $type B; $struct C { }; }\n$type n::C;"));
+  EXPECT_EQ(
+      "",
+      Fault("@import \"b.h\"\n$type+ n::m::A; namespace n { $type+ m::A; $type+ B; $struct C { }; }\n$type+ n::C;"));
 }
 
 TEST_F(LookUp, NothingIsSeenWithoutImport) {
   AddHeader("a.h", "$struct A { }; namespace n { }");
   Translate("a.h");
-  EXPECT_EQ("t.cpp(1) : error : Unrecognised identifier : A", Fault("$type A; @import \"a.h\""));
+  EXPECT_EQ("t.cpp(1) : error : Unrecognised identifier : A", Fault("$type+ A; @import \"a.h\""));
 }
 
 TEST_F(LookUp, ForwardDeclarationsNeverConflict) {
@@ -61,7 +62,7 @@ TEST_F(LookUp, ForwardDeclarationsNeverConflict) {
   AddHeader("b.h", "$struct X; $struct+ Y;");
   AddHeader("c.h", "$struct+ X { };");
   const std::string imports = "@import \"a.h\"\n@import \"c.h\"\n@import \"b.h\"\n";
-  EXPECT_EQ("", Fault(imports + "$type+ X; $type Y; $struct X;\n"));
+  EXPECT_EQ("", Fault(imports + "$type+ X; $type+ Y; $struct X;\n"));
   EXPECT_EQ("t.cpp(4) : error : Repeated definition of $struct X", Fault(imports + "$struct X { };"));
   EXPECT_EQ(
       "b.h(1) : warning W1017 : + on forward declaration of Y deprecated\nc.h(1) : see declaration of $struct+ X\n",
@@ -70,11 +71,11 @@ TEST_F(LookUp, ForwardDeclarationsNeverConflict) {
 
 // The newest declaration of a name is the one that may still become a definition.
 TEST_F(LookUp, OwnDeclarationsMoveOn) {
-  EXPECT_EQ("", Fault("$struct X; $struct Y { $X* x; }; $struct X; $struct X { }; $type X;"));
+  EXPECT_EQ("", Fault("$struct X; $struct Y { $X* x; }; $struct X; $struct X { }; $type+ X;"));
   MakeWorld(TargetType::Application);
   AddHeader("a.h", "$class X;");
   AddHeader("b.h", "@import \"a.h\"\n$class X; $class+ X;");
-  EXPECT_EQ("", Fault("@import \"b.h\"\n$class X { }; $type X;"));
+  EXPECT_EQ("", Fault("@import \"b.h\"\n$class X { }; $type+ X;"));
 }
 
 TEST_F(LookUp, Ambiguity) {
@@ -84,10 +85,34 @@ TEST_F(LookUp, Ambiguity) {
   AddHeader("d.h", "$struct Y; $enum Z;");
   AddHeader("e.h", "$enum Y; $enum Z;");
   EXPECT_EQ("", Fault("@import \"a.h\"\n@import \"b.h\"\n@import \"c.h\"\n"));
-  EXPECT_EQ("error : Ambiguous identifier : X", Fault("@import \"a.h\"\n@import \"b.h\"\n$type X;"));
-  EXPECT_EQ("error : Ambiguous identifier : X", Fault("@import \"a.h\"\n@import \"c.h\"\n$type X;"));
-  EXPECT_EQ("error : Ambiguous identifier : Y", Fault("@import \"d.h\"\n@import \"e.h\"\n$type Z; $type Y;"));
-  EXPECT_EQ("", Fault("@import \"c.h\"\n$type X;"));
+  EXPECT_EQ("error : Ambiguous identifier : X", Fault("@import \"a.h\"\n@import \"b.h\"\n$type+ X;"));
+  EXPECT_EQ("error : Ambiguous identifier : X", Fault("@import \"a.h\"\n@import \"c.h\"\n$type+ X;"));
+  EXPECT_EQ("error : Ambiguous identifier : Y", Fault("@import \"d.h\"\n@import \"e.h\"\n$type+ Z; $type+ Y;"));
+  EXPECT_EQ("", Fault("@import \"c.h\"\n$type+ X;"));
+}
+
+// A name space in an unnamed one is another than that of its name beside the unnamed one.
+TEST_F(LookUp, UnnamedNameSpaces) {
+  AddHeader("a.h", "namespace { namespace b { $enum+ E { x }; } }");
+  AddHeader("b.h", "namespace b { $enum+ E { x }; }");
+  const std::string imports = "@import \"a.h\"\n@import \"b.h\"\n";
+  EXPECT_EQ("t.cpp(2) : error : Unrecognised identifier : E", Fault("@import \"a.h\"\nnamespace b { $type+ E; }"));
+  EXPECT_EQ("", Fault(imports + "namespace b { $type+ E; } namespace { namespace b { $type+ E; } }"));
+}
+
+// One in a class body stands in the name space around the class, unless a thing of its name is seen there.
+TEST_F(LookUp, ForwardDeclarationsInClasses) {
+  for (const std::string nested : {"$class N;", "$struct N;", "$mixin N;", "$interface N;", "$enum N;",
+                                   "$enum class N;", "$variant N;", "$struct N; $struct N;"}) {
+    EXPECT_EQ("", Fault("namespace a { $struct+ K { " + nested + " $N* n; }; $type+ N; }\n$type+ a::N;")) << nested;
+    MakeWorld(TargetType::Application);
+  }
+  AddHeader("a.h", "$struct X { };");
+  AddHeader("b.h", "$struct X { }; $enum Y { y };");
+  EXPECT_EQ("", Fault("@import \"a.h\"\n@import \"b.h\"\n$enum Z { z };\n"
+                      "$struct+ K { $struct X; $struct Y; $struct Z; $Y y; $Z z; };"));
+  AssertErrors(
+      {{"$struct K { $struct N; };\n$enum N { n };", 2, "$enum N conflicts with previous declaration of $struct N"}});
 }
 
 TEST_F(NameSpaceTest, Conflicts) {
