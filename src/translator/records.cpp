@@ -90,7 +90,7 @@ void ParseType(QrexParser& parser) {
   bool reflected = registered;
   if (parser.Is(kShiftLeft)) parser.ParseQualifierFlags(reflected, registered, " >> on $type");
   TypeCode code;
-  if (!parser.ParseTypeWithName(code, nullptr, false, nullptr, true)) {
+  if (!parser.ParseTypeWithName(code, nullptr, false, nullptr, reflected)) {
     parser.Fail("Type expected when read " + Printed(parser.current));
   }
   const std::string type = TypeText(code);

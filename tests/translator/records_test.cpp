@@ -74,11 +74,22 @@ TEST_F(RecordsTest, TypeRegistrations) {
             host->RegisterMap().entries["app/src/t.cpp"]);
 }
 
+// A type that is not reflected need not be understood.
+TEST_F(RecordsTest, UnreflectedTypes) {
+  AssertHeader("$type int;$type <<-reflect>> std::vector<int>*;", R"(vesk::ReflectionByteCode _GetReflected(int const*);
+vesk::TypeOps const& _GetTypeOps(int const*);
+vesk::ReflectionByteCode _GetReflected(std::vector<int>* const*);
+vesk::TypeOps const& _GetTypeOps(std::vector<int>* const*);
+)");
+}
+
 TEST_F(RecordsTest, TypeErrors) {
   EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$type int32;"));
   AssertErrors({
       {"$type\n1;", 2, "Type expected when read 1"},
-      {"$type std::string;", 1, "Unrecognised identifier : std"},
+      {"$type+ std::string;", 1, "Unrecognised identifier : std"},
+      {"$type <<reflect>>\nxvector<int>;", 2, "Can't accept platform dependent type: int"},
+      {"$type <<register>> std::vector<int32>;", 1, "Unrecognised identifier : std"},
       {"$type+ xvector<int8>\n x", 2, "; expected after $type vesk::xvector<vesk::int8> when read x"},
   });
 }
