@@ -32,7 +32,8 @@ std::unique_ptr<MpfwSourceFile> MpfwParser::CreateSourceFile() { return std::mak
 
 MpfwSourceFile* MpfwParser::LoadSourceFile(const std::string& path, const std::string& extraText) {
   std::string text;
-  if (!LoadText(text, path, true)) throw LexScannerException("Couldn't open file " + path, current);
+  // What is looked up is a plain file; a configuration may also come through a pipe.
+  if (!LoadStream(text, path)) throw LexScannerException("Couldn't open file " + path, current);
   std::unique_ptr<MpfwSourceFile> made = CreateSourceFile();
   MpfwSourceFile& file = *made;
   file.path = path;

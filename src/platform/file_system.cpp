@@ -71,6 +71,7 @@ bool Stat(const std::string& path, FileInfo& info) {
   struct stat status;
   if (stat(path.c_str(), &status) != 0) return false;
   info.isDirectory = S_ISDIR(status.st_mode);
+  info.isPlain = S_ISREG(status.st_mode);
   info.isReadOnly = (status.st_mode & kWriteBits) == 0;
   info.creationTime = FileTime(status.st_ctim);
   info.accessTime = FileTime(status.st_atim);
@@ -90,13 +91,13 @@ DirectoryTimes::~DirectoryTimes() {
 
 int64_t DirectoryTimes::WriteTimeOf(const char* name) const {
   struct stat status;
-  const bool isFile = fstatat(m_descriptor, name, &status, 0) == 0 && !S_ISDIR(status.st_mode);
+  const bool isFile = fstatat(m_descriptor, name, &status, 0) == 0 && S_ISREG(status.st_mode);
   return isFile ? FileTime(status.st_mtim) : 0;
 }
 
 bool CanRead(const std::string& path) {
   FileInfo info;
-  return Stat(path, info) && !info.isDirectory && access(path.c_str(), R_OK) == 0;
+  return Stat(path, info) && info.isPlain && access(path.c_str(), R_OK) == 0;
 }
 
 bool IsReadOnlyFile(const std::string& path) {
@@ -104,13 +105,18 @@ bool IsReadOnlyFile(const std::string& path) {
   return Stat(path, info) && !info.isDirectory && info.isReadOnly;
 }
 
-bool ReadFile(const std::string& path, std::string& content) {
+bool ReadFile(const std::string& path, std::string& content, Readable kind) {
   SetLastError(0);
-  Descriptor file(path, O_RDONLY);
+  const bool plainOnly = kind == Readable::PlainFile;
+  Descriptor file(path, O_RDONLY | (plainOnly ? O_NONBLOCK : 0));  // the open itself may wait for a pipe's writer
   struct stat status;
   if (!file || fstat(file.Number(), &status) != 0) return false;
   if (S_ISDIR(status.st_mode)) {
     errno = EISDIR;
+    return false;
+  }
+  if (plainOnly && !S_ISREG(status.st_mode)) {
+    errno = EACCES;
     return false;
   }
   content.clear();

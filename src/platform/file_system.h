@@ -16,6 +16,7 @@ constexpr size_t kLongestName = 255;  // of a file, in bytes
 
 struct FileInfo {
   bool isDirectory = false;
+  bool isPlain = false;  // a file of bytes: no directory, pipe, socket or device
   bool isReadOnly = false;
   bool isHidden = false;     // the name begins with a dot
   int64_t creationTime = 0;  // all times in 100 ns units since 1601
@@ -27,7 +28,8 @@ struct FileInfo {
 
 bool Stat(const std::string& path, FileInfo& info);
 
-// The write times of many files of one directory: cheaper than to walk each whole path. 0 for a file that is not there.
+// The write times of many files of one directory: cheaper than to walk each whole path. 0 for a file that is not there
+// and for what is no plain file.
 class DirectoryTimes {
  public:
   explicit DirectoryTimes(const std::string& directory);
@@ -41,12 +43,14 @@ class DirectoryTimes {
   int m_descriptor;
 };
 
-bool CanRead(const std::string& path);  // a file, not a directory, that opens for reading
+bool CanRead(const std::string& path);  // a plain file that opens for reading
 bool IsReadOnlyFile(const std::string& path);
-bool ReadFile(const std::string& path, std::string& content);
+// A pipe or device is read to its end, which may be waited for without end, only where the caller asks for it.
+enum class Readable { PlainFile, AnyFile };
+bool ReadFile(const std::string& path, std::string& content, Readable kind = Readable::PlainFile);
 // Memory that is about to be filled is had faster in large pages. No more than a hint.
 void PreferLargePages(void* memory, size_t size);
-void ReserveText(std::string& text, size_t size);  // as reserve, in large pages where it is large
+void ReserveText(std::string& text, size_t size);                   // as reserve, in large pages where it is large
 bool WriteFile(const std::string& path, std::string_view content);  // in place of what stands there, read-only or not
 bool MakeEmptyFile(const std::string& path, bool keepExisting);
 bool RemoveFile(const std::string& path);

@@ -113,7 +113,7 @@ bool SetReadOnly(const std::string& path, bool readOnly) {
 
 int64_t LastWriteTime(const std::string& path) {
   platform::FileInfo info;
-  return platform::Stat(Checked(path), info) && !info.isDirectory ? info.writeTime : 0;
+  return platform::Stat(Checked(path), info) && info.isPlain ? info.writeTime : 0;
 }
 
 FileTimes::FileTimes() = default;
@@ -193,6 +193,14 @@ bool LoadText(std::string& out, const std::string& path, bool foldLineEnds) {
   std::string text;
   if (!ReadWholeFile(text, path)) return false;
   if (foldLineEnds) FoldLineEnds(text);
+  out = std::move(text);
+  return true;
+}
+
+bool LoadStream(std::string& out, const std::string& path) {
+  std::string text;
+  if (!platform::ReadFile(Checked(path), text, platform::Readable::AnyFile)) return false;
+  FoldLineEnds(text);
   out = std::move(text);
   return true;
 }
@@ -288,7 +296,7 @@ bool File::Open(const std::string& path, FileMode mode) {
   const bool forWriting = mode != FileMode::ReadText && mode != FileMode::ReadBinary;
   platform::FileInfo info;
   if (mode == FileMode::Closed || (forWriting && platform::IsReadOnlyFile(path))) return false;
-  if (platform::Stat(path, info) && info.isDirectory) return false;
+  if (platform::Stat(path, info) && !info.isPlain) return false;
   m_stream = std::fopen(path.c_str(), kModes[static_cast<int>(mode)]);
   return m_stream != nullptr;
 }

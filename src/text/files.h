@@ -20,7 +20,7 @@ namespace platform {
 class DirectoryTimes;
 }
 
-bool FileExists(const std::string& path);  // false for a directory and for a file that cannot be opened for reading
+bool FileExists(const std::string& path);  // a plain file that opens for reading: no directory, pipe, socket, device
 // FileExists for many files of few directories: each directory is listed once.
 class FileLookup {
  public:
@@ -35,7 +35,7 @@ bool CopyFile(const std::string& from, const std::string& to, bool failIfExists)
 bool CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 bool SetReadOnly(const std::string& path, bool readOnly);
-int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a directory and a missing file
+int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a missing and for no plain file
 // The same for many files of few directories, which must stay where they are meanwhile.
 class FileTimes {
  public:
@@ -53,6 +53,7 @@ bool FullPathOf(const std::string& path, std::string& out);
 bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
 bool ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
+bool LoadStream(std::string& out, const std::string& path);  // as LoadText with folding, also from a pipe or device
 
 // The name of this process's own under which a file is written before it takes the place of `path`; where that name
 // would be too long, a number stands for the file's. The first call for a folder removes what killed runs left there.

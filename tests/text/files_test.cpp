@@ -3,6 +3,7 @@
 #include "text/files.h"
 
 #include <gtest/gtest.h>
+#include <sys/stat.h>
 
 #include <filesystem>
 
@@ -133,6 +134,27 @@ TEST_F(FilesTest, Operations) {
   EXPECT_EQ(root.substr(root.rfind('/')) + "/b/c", full.substr(full.size() - 15));
   EXPECT_FALSE(FullPathOf("", full));
   EXPECT_THROW(FileExists("\xff"), StringConversionException);
+}
+
+TEST_F(FilesTest, WhatIsNoPlainFile) {
+  CreateDirectories(root, true);
+  const std::string pipe = root + "/pipe", link = root + "/link";
+  ASSERT_EQ(0, mkfifo(pipe.c_str(), 0666));
+  std::filesystem::create_symlink(Make("file", "text"), link);
+  FileTimes times;
+  for (const std::string& path : {pipe, std::string("/dev/null")}) {
+    EXPECT_FALSE(FileExists(path) || FileLookup().Exists(path)) << path;
+    EXPECT_EQ(0, LastWriteTime(path)) << path;
+    EXPECT_EQ(0, times.LastWriteTime(path)) << path;
+    EXPECT_EQ("none", Content(path));
+    EXPECT_FALSE(CopyFile(path, root + "/to", false) || File().Open(path, FileMode::ReadBinary)) << path;
+  }
+  EXPECT_TRUE(FileExists(link) && LastWriteTime(link) != 0);
+  ReplaceFile(pipe, "text");
+  EXPECT_EQ("text", Content(pipe));
+  std::string text = "old";
+  EXPECT_TRUE(LoadStream(text, "/dev/null"));
+  EXPECT_EQ("", text);
 }
 
 TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
