@@ -142,6 +142,7 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   const std::string text = isGcc ? GccLinkerText(builder, target, inputs) : VisualLinkerText(builder, inputs);
   int returnCode = 0;
   bool linked = false;
+  CreateDirectories(target, false);
   try {
     const CommandFile response(responseFile, text);
     TraceWriter() << "Linking...\n";

@@ -204,10 +204,13 @@ void WorkspaceRun::MakeDirectories(const Project& project) {
     if (!m_settings.translateOnly) {
       make(config->platform + "/" + config->name + "/" + project.name);
     }
-    if (project.exported || !IsLibrary(project.targetType)) continue;
-    if (!m_settings.translateOnly) {
+    if (project.exported) continue;
+    const bool isLibrary = IsLibrary(project.targetType);
+    // A build makes the folder of a program ahead of its link; the generated projects find it made.
+    if (!m_settings.translateOnly && (isLibrary || m_settings.mode == RunMode::Gen)) {
       make(PathJoin3(m_settings.exportLib, config->platform, config->name));
     }
+    if (!isLibrary) continue;
     make(m_settings.exportTranslatedInclude);
     make(m_settings.exportUntranslatedInclude);
   }

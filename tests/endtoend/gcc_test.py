@@ -135,6 +135,27 @@ def link_errors_are_counted_and_leave_no_target(workspace):
     equal(workspace.shell(PROGRAM), RESULT)
 
 
+# A program that needs no library of the workspace, so that nothing else makes the folder of its target.
+PROGRAM_ALONE = {
+    "all.qrex": SETTINGS,
+    "tree/.qrwsroot": "",
+    "tree/all.qrws": '"all" { "app" }\n',
+    "tree/app/src/app.qrpj": '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nconfig { "Debug|x64" }\n'
+                             '+cpp { -MMD }\nqrex\n{ "src" { "x.cpp" } }\n',
+    "tree/app/src/x.cpp": "int main() { return 7; }\n",
+}
+
+
+@in_workspace(PROGRAM_ALONE, "g++", "make")
+def a_program_without_libraries_is_linked(workspace):
+    holds(workspace.run("all.qrex"), "Linking...\n", "\nCompleted....")
+    workspace.shell(PROGRAM, status=7)
+    workspace.shell("rm -r out x64 qrexsource")
+    workspace.run("all.qrex", "mode=gen")
+    workspace.shell(MAKE)
+    workspace.shell(PROGRAM, status=7)
+
+
 def failing_tools_are_counted_and_the_next_run_recovers(binary):
     need("g++")
     half_an_object = 'text=$(cat "${2#@}"); object=${text##* -o \\"}; echo half > "${object%%\\"*}"\n'
@@ -242,6 +263,7 @@ run_tests([
     builds_libraries_and_a_program_and_only_what_is_stale,
     messages_point_at_the_source,
     link_errors_are_counted_and_leave_no_target,
+    a_program_without_libraries_is_linked,
     failing_tools_are_counted_and_the_next_run_recovers,
     missing_tools_are_named_and_counted,
     captured_output_that_cannot_be_read_is_an_error,
