@@ -103,7 +103,6 @@ bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload) {
       ScannedFile* import = FindScanned(builder, reader.String());
       if (!import) return false;
       file->imports.push_back(import);
-      file->importsIObject = file->importsIObject || import->importsIObject;
     }
     file->hasDeclarations = reader.Number(1) != 0;
   }

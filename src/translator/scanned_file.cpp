@@ -20,6 +20,8 @@ namespace {
 constexpr std::string_view kIObjectPath = "Vesk/vxObject/IObject.h";
 constexpr int64_t kHeaderHeadLines = 4;
 
+bool IsIObject(const ProjectFile& file) { return file.path == kIObjectPath; }
+
 class DiscardStream : public IOutputStream {
  public:
   void Write(const void*, size_t) override {}
@@ -91,7 +93,7 @@ ScannedFile::ScannedFile(TranslationHost& host, ProjectFile& file)
       file(file),
       index(host.NextFileIndex()),
       rootNameSpace(std::make_unique<NameSpace>(*this, nullptr, "")) {
-  importsIObject = file.path == kIObjectPath;
+  importsIObject = IsIObject(file);
 }
 
 ScannedFile::~ScannedFile() = default;
@@ -161,6 +163,7 @@ void ScannedFile::WriteTranslation(const std::string& target) {
   const std::vector<ScannedFile*> knownImports = std::move(imports);
   imports.clear();
   importClosure = {};
+  importsIObject = IsIObject(file);
   GeneratedFile generated(target);
   DiscardStream discarded;
   IOutputStream& out = needsWriting ? static_cast<IOutputStream&>(generated) : discarded;

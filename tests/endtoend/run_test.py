@@ -197,6 +197,22 @@ def test_what_an_edit_makes_stale():
     expect(text.count('\n* ') == 7, text)
 
 
+def test_an_import_that_is_gone_is_missed():
+    interface = 'Vesk/vxObject/IObject.h'
+    write_tree({'main.qrex': CONFIG + 'workspaces = { "app" "vxObject" }',
+                'tree/vxObject/src/vxObject.qrpj': PROJECT.replace('"app"', '"Vesk/vxObject"') + '{ "IObject.h" }',
+                'tree/' + interface: 'namespace vesk { $interface+ IObject { }; }\n',
+                'tree/app/b.h': f'@import "{interface}"\n', 'tree/app/c.h': '@import "b.h"\n$struct S { };\n'})
+    run()
+    good = {path: read(path) for path in ('tree/app/b.h', 'tree/app/c.h')}
+    for path, content in ('tree/app/b.h', ''), ('tree/app/c.h', '$struct S { };\n'):
+        edit(path, content)
+        for _ in range(2):
+            holds(run(status=1), 'tree/app/c.h(', 'error : @import of IObject.h required')
+        edit(path, good[path])
+        run()
+
+
 def test_clean_compile_show():
     write_tree()
     run()
@@ -492,6 +508,24 @@ def test_standard_output_that_takes_nothing():
     with os.fdopen(reading) as pipe:
         holds(pipe.read(), 'argv[60] = ', '\nCompleted')
     expect(process.wait() == 0, 'status')
+
+
+def test_what_is_no_plain_file():
+    write_tree()
+    run()
+    for path in ['tree/app/c.h', 'tree/app/n.txt', TRANSLATED + 'src/app.cpp', 'tree/.qrwsroot']:
+        os.remove(path)
+        os.mkfifo(path)
+    holds(run(status=1), "Couldn't open file tree/app/c.h\n")
+    holds(run('main.qrex', 'mode=show', '$COMPILE_FILE_PATH = "tree/app/a.h"', status=1), 'Search for .qrwsroot failed\n')
+    os.remove('tree/app/c.h')
+    write('tree/app/c.h', 'int c;\n')
+    text = run()
+    holds(text, f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n', '\nCompleted')
+    lacks(text, '...Copy file failed')
+    expect(stat.S_ISREG(os.stat(TRANSLATED + 'src/app.cpp').st_mode), 'the output is written anew')
+    holds(subprocess.run([BINARY, '/dev/stdin'], input=read('main.qrex'), stdout=subprocess.PIPE).stdout.decode(),
+          '\nCompleted')  # a configuration may come through a pipe
 
 
 def test_full_disk():
