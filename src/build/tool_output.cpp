@@ -1,5 +1,7 @@
 #include "build/tool_output.h"
 
+#include <algorithm>
+
 #include "text/files.h"
 #include "text/paths.h"
 
@@ -31,7 +33,10 @@ struct Message {
 
 class OutputScanner {
  public:
-  explicit OutputScanner(ProjectBuilder& builder) : m_builder(builder) { FullPathOf(".", m_currentDirectory); }
+  explicit OutputScanner(ProjectBuilder& builder) : m_builder(builder) {
+    FullPathOf(".", m_currentDirectory);
+    if (!m_currentDirectory.ends_with('/')) m_currentDirectory += '/';
+  }
 
   bool Scan(std::string_view text) {
     while (!text.empty()) {
@@ -104,28 +109,25 @@ class OutputScanner {
   }
 
   void PointAtSource(std::string_view indentation, const Message& message) {
-    std::string file = NormaliseSlashes(message.file);
-    StripIgnoringCase(file, m_currentDirectory + "/");
-    StripIgnoringCase(file, "./");
+    // A compiler tells how it came to a file: from here or not, with `.` and `..` as its include paths have them.
+    std::string file(message.file);
+    std::replace(file.begin(), file.end(), '\\', '/');
+    if (!IsAbsolutePath(file)) file.insert(0, m_currentDirectory);
+    file = CollapseDots(file);
+    StripIgnoringCase(file, m_currentDirectory);
     if (!StripIgnoringCase(file, TranslationDirectory(m_builder.config))) return;
     if (!file.empty() && file.front() == '/') file.erase(0, 1);
     auto found = m_builder.scannedByPath.find(file);
     std::string path;
     int64_t line;
-    if (found == m_builder.scannedByPath.end() || !found->second->MapGeneratedLine(message.line, path, line)) return;
+    if (found == m_builder.scannedByPath.end() || !found->second->MapGeneratedLine(message.line, m_trace, path, line)) {
+      return;
+    }
     m_trace << indentation << path << "(" << line << ") ...\n";
   }
 
-  static std::string NormaliseSlashes(std::string_view path) {
-    std::string normal(path);
-    for (char& c : normal) {
-      if (c == '\\') c = '/';
-    }
-    return normal;
-  }
-
   ProjectBuilder& m_builder;
-  std::string m_currentDirectory;
+  std::string m_currentDirectory;  // with a slash at the end
   TraceWriter m_trace;
   bool m_result = true;
 };

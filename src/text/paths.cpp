@@ -1,6 +1,7 @@
 #include "text/paths.h"
 
 #include <algorithm>
+#include <filesystem>
 
 namespace qrex {
 
@@ -50,6 +51,10 @@ std::string NormalisePath(std::string_view path) {
   std::replace(normal.begin(), normal.end(), '\\', '/');
   if (!normal.empty() && normal.back() == '/') normal.pop_back();
   return normal;
+}
+
+std::string CollapseDots(std::string_view path) {
+  return std::filesystem::path(path).lexically_normal().generic_string();
 }
 
 bool HasExtension(std::string_view path, std::string_view extension) {

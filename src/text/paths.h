@@ -12,6 +12,7 @@ bool IsAbsolutePath(std::string_view path);
 std::string_view FileNameOf(std::string_view path);
 bool StemOf(std::string_view path, std::string& stem);  // false, `stem` untouched: no '.', or an empty stem
 std::string NormalisePath(std::string_view path);       // '\' to '/', one trailing '/' removed
+std::string CollapseDots(std::string_view path);        // each "." is removed, each ".." with the folder ahead of it
 bool HasExtension(std::string_view path, std::string_view extension);
 bool ReplaceExtension(std::string_view path, std::string_view extension, std::string& out);
 std::string PathJoin(std::string_view left, std::string_view right);

@@ -203,10 +203,10 @@ bool ScannedFile::CopySource(const std::string& target) const {
   return true;
 }
 
-bool ScannedFile::MapGeneratedLine(int64_t generatedLine, std::string& path, int64_t& line) const {
+bool ScannedFile::MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const {
   if (!translated) {
-    TraceWriter() << "\nNOTE: Need @import instead of #include \"" << file.name
-                  << "\" to pinpoint errors in original source files\n";
+    trace << "\nNOTE: Need @import instead of #include \"" << file.name
+          << "\" to pinpoint errors in original source files\n";
     return false;
   }
   if (file.kind == FileKind::H) generatedLine -= kHeaderHeadLines;
@@ -216,7 +216,7 @@ bool ScannedFile::MapGeneratedLine(int64_t generatedLine, std::string& path, int
     position = lineTable[std::min<size_t>(static_cast<size_t>(generatedLine), lineTable.size()) - 1];
   }
   if (!position) {
-    TraceWriter() << "\nINTERNAL ERROR: convert error position failed because line number invalid\n";
+    trace << "\nINTERNAL ERROR: convert error position failed because line number invalid\n";
     return false;
   }
   return host.FindSourcePosition(position, path, line);

@@ -340,8 +340,9 @@ TEST_F(ToolsTest, MessagesAreCounted) {
 TEST_F(ToolsTest, MessagesPointAtTheSource) {
   Project& app = AddProject("app", TargetType::Application);
   ProjectFile& source = AddSource(app, "x.cpp", "@def both = { int a;\nint b; }\nboth\nint c;\n");
-  AddSource(app, "unused.cpp");
+  ProjectFile& unused = AddSource(app, "unused.cpp");
   Builder(CompilerKind::gcc);
+  builder->GetScannedFile(unused);
   ScannedFile& scanned = builder->GetScannedFile(source);
   scanned.needsWriting = true;
   scanned.WriteGeneratedFile();
@@ -358,6 +359,26 @@ TEST_F(ToolsTest, MessagesPointAtTheSource) {
                 "/QREXSOURCE\\x64\\Debug/app\\src\\x.cpp(1): warning B\ntree/app/src/x.cpp(4) ...\n" + translated +
                 ":3:1: error: C\ntree/app/src/x.cpp(1) : error D\nqrexsource/x64/Debug/no.cpp(1) : error E",
             trace);
+
+  // As a compiler spells it that came there through an include path or another file.
+  for (const std::string& spelling :
+       {std::string("qrexsource/x64/Debug/app/api/../src/x.cpp"),
+        std::string("./qrexsource/none/.././x64//Debug/app/src/x.cpp"),
+        "../" + std::string(FileNameOf(folder)) + "/" + translated, folder + "/tree\\..\\" + translated}) {
+    for (const char* message : {":3:1: error: C\n", "(3) : error C\n"}) {
+      trace.clear();
+      ScanToolOutput(*builder, spelling + message);
+      EXPECT_EQ("tree/app/src/x.cpp(4) ...\n" + spelling + message, trace);
+    }
+  }
+  // What cannot be mapped is told at its line.
+  trace.clear();
+  const std::string first = "a.cpp(1) : error A\n", second = "qrexsource/x64/Debug/app/src/unused.cpp(1) : error B\n";
+  ScanToolOutput(*builder, first + second);
+  ASSERT_EQ(
+      first + "\nNOTE: Need @import instead of #include \"unused.cpp\" to pinpoint errors in original source files\n" +
+          second,
+      trace);
 }
 
 // --- Links

@@ -10,7 +10,8 @@ class LoopTest : public TranslateTest {
   std::string SourceOf(const std::string& name, int64_t generatedLine) {
     std::string path;
     int64_t line = 0;
-    if (!Scanned(name).MapGeneratedLine(generatedLine, path, line)) return "none";
+    TraceWriter messages;
+    if (!Scanned(name).MapGeneratedLine(generatedLine, messages, path, line)) return "none";
     return path + ":" + std::to_string(line);
   }
 };
