@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "build/dependency_file.h"
+#include "build/reflection_tails.h"
 #include "build/staleness.h"
 #include "build/tools.h"
 #include "text/files.h"
@@ -94,12 +95,16 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
     TraceWriter() << "No dependency file " << dependencyFile << "\n";
   }
   if (!settings.translateOnly) CreateDirectories(IntermediateDirectory(), true);
+  const size_t knownFiles = FileCount();
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (dependencyFileLoaded) ReadTimes();
   for (ScannedFile* file : scanned) {
     file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
-    if (file->needsWriting && settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
+    if (!file->needsWriting) continue;
+    hasStaleFiles = true;
+    if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
+  if (dependencyFileLoaded && hasStaleFiles) FindTailHolders(*this, knownFiles);
 }
 
 // What the steps of an unchanged project ask for, at once: many files are waited for together.
@@ -136,9 +141,13 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   const FileKind kind = file.file.kind;
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
+  const bool isWritten = isWanted && !project.exported;
   bool result = true;
   if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
-  if (file.needsWriting && (kind == FileKind::H || (isWanted && !project.exported))) file.WriteGeneratedFile();
+  if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.translated) {
+    file.needsWriting = TailsMoved(file);
+  }
+  if (file.needsWriting && (kind == FileKind::H || isWritten)) file.WriteGeneratedFile();
   if (RunsTools() && isBuild && IsVisualCpp(settings.compiler) && settings.compiler != CompilerKind::vc6 &&
       kind == FileKind::Rc) {
     result = CompileResourceIfStale(file);
@@ -200,6 +209,7 @@ void ProjectBuilder::Save(const std::string& dependencyFile) {
       if (file->file.isMainSource && (!file->translated || file->needsWriting)) file->translationTime = 0;
     }
   }
+  if (hasStaleFiles) ForgetUnsettledTails(*this);
   SaveDependencyFile(*this, dependencyFile);
 }
 

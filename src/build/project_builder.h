@@ -36,6 +36,7 @@ class ProjectBuilder : public TranslationHost {
   DeclarationRegistry& UnregisterMap() override { return unregisterMap; }
   SymbolIndex& Symbols() override { return m_symbols; }
   size_t NextFileIndex() override { return m_nextFileIndex++; }
+  size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
   void CountWarning() override { ++warningCount; }
   bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const override;
 
@@ -58,6 +59,7 @@ class ProjectBuilder : public TranslationHost {
   std::unordered_map<std::string_view, std::unique_ptr<ScannedFile>> scannedByPath;
   FileTimes times;
   bool dependencyFileLoaded = false;
+  bool hasStaleFiles = false;  // as judged from the dependency file and the times
   int64_t errorCount = 0;
   int64_t warningCount = 0;
 

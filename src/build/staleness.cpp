@@ -45,11 +45,12 @@ bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file) {
 }
 
 void MarkRegistered(ScannedFile& file) {
+  for (ScannedFile* import : file.imports) {
+    if (import->tailHolder == &file) import->registered = true;
+  }
   if (file.registered) return;
   for (ScannedFile* import : file.imports) {
-    const ProjectFile& imported = import->file;
-    if (imported.project != file.file.project) continue;
-    if (!imported.pairedSource || imported.pairedSource == &file.file) import->registered = true;
+    if (MayHoldTail(file.file, import->file)) import->registered = true;
   }
   file.registered = true;
 }

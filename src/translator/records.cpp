@@ -190,11 +190,10 @@ void WriteReflectionTails(ScannedFile& file, TextWriter& out) {
   const ProjectFile& source = file.file;
   bool wroteHeader = false;
   for (ScannedFile* import : file.imports) {
-    const ProjectFile& imported = import->file;
-    if (imported.project != source.project || import->registered) continue;
-    if (imported.pairedSource && imported.pairedSource != &source) continue;
+    if (import->registered || !MayHoldTail(source, import->file)) continue;
     WriteTail(*import, out, lists);
-    wroteHeader = wroteHeader || &imported == source.pairedHeader;
+    file.newTails.push_back(import);
+    wroteHeader = wroteHeader || &import->file == source.pairedHeader;
   }
   if (source.pairedHeader && !wroteHeader) {
     TraceWriter() << file.SourcePath() << "(1) : warning : cpp file doesn't directly import header with same name\n";

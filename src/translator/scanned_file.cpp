@@ -76,6 +76,10 @@ std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const Scann
 
 }  // namespace
 
+bool MayHoldTail(const ProjectFile& source, const ProjectFile& imported) {
+  return imported.project == source.project && (!imported.pairedSource || imported.pairedSource == &source);
+}
+
 void DeclarationRegistry::Update(const std::string& path, const std::vector<std::string>& names) {
   auto found = entries.find(path);
   if (names.empty()) {
@@ -160,6 +164,7 @@ void ScannedFile::WriteTranslation(const std::string& target) {
   registerNames.clear();
   unregisterNames.clear();
   typeRegistrations.clear();
+  newTails.clear();
   const std::vector<ScannedFile*> knownImports = std::move(imports);
   imports.clear();
   importClosure = {};
@@ -187,6 +192,23 @@ void ScannedFile::WriteTranslation(const std::string& target) {
   needsWriting = false;
   latestTargetTime = targetTime = 0;
   translationTime = readTime;
+  HoldTails(knownImports);
+}
+
+// The output holds the tails of this translation, and no longer those of the one before.
+void ScannedFile::HoldTails(const std::vector<ScannedFile*>& oldImports) {
+  for (ScannedFile* import : oldImports) {
+    if (import->tailHolder == this) import->tailHolder = nullptr;
+  }
+  lostTail = false;
+  for (ScannedFile* import : newTails) {
+    if (import->tailHolder && import->HasTail()) import->tailHolder->lostTail = true;
+    import->tailHolder = this;
+  }
+}
+
+bool ScannedFile::HasTail() const {
+  return hasDeclarations || !typeRegistrations.empty() || !registerNames.empty() || !unregisterNames.empty();
 }
 
 bool ScannedFile::CopySource(const std::string& target) const {

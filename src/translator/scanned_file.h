@@ -51,6 +51,10 @@ struct TypeRegistration {
   const NameSpace* scope = nullptr;  // the name space of the declaration
 };
 
+// Whether the reflection tail of an imported file may stand in this .cpp: it is of the same project, and no other .cpp
+// has its stem.
+bool MayHoldTail(const ProjectFile& source, const ProjectFile& imported);
+
 class ScannedFile : public ImportHandler {
  public:
   ScannedFile(TranslationHost& host, ProjectFile& file);
@@ -64,13 +68,18 @@ class ScannedFile : public ImportHandler {
   // The source position of a 1-based line of the generated text; false (with a message to `trace`) when there is none.
   bool MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const;
 
+  bool HasTail() const;  // once translated: it leaves something for a reflection tail
+
   TranslationHost& host;
   ProjectFile& file;
   std::vector<std::string> registerNames;    // $init
   std::vector<std::string> unregisterNames;  // $uninit
   std::vector<TypeRegistration> typeRegistrations;
   std::vector<const char*> lineTable;  // source position of each generated line, null where unknown
-  bool registered = false;
+  bool registered = false;             // its tail stands in an output
+  ScannedFile* tailHolder = nullptr;   // the .cpp in whose output; null where none is known
+  std::vector<ScannedFile*> newTails;  // of a .cpp: those that its translation wrote
+  bool lostTail = false;               // of a .cpp: its output holds a tail that has been written into another one
   bool needsWriting = false;
   std::string sourceText;
   std::string expandedText;
@@ -92,6 +101,7 @@ class ScannedFile : public ImportHandler {
 
  private:
   void WriteTranslation(const std::string& target);
+  void HoldTails(const std::vector<ScannedFile*>& oldImports);
   bool CopySource(const std::string& target) const;  // false, with a message, when it failed
 };
 

@@ -213,6 +213,37 @@ def test_an_import_that_is_gone_is_missed():
         run()
 
 
+def test_tails_follow_an_edit():
+    # the tail of c.h, which has no c.cpp, stands in the first .cpp that imports it
+    write_tree({'tree/app/c.h': '$enum+ C { c };\n', 'tree/app/src/x.cpp': '@import "app/c.h"\nint x;\n',
+                'tree/app/src/app.qrpj': PROJECT + '{ "c.h" "plain.h" "src" { "w.cpp" "x.cpp" "y.cpp" "app.cpp" } }\n',
+                'tree/app/plain.h': 'int p;\n', 'tree/app/src/w.cpp': '', 'tree/app/src/y.cpp': '@import "app/c.h"\n'})
+    run()
+
+    def after(name, content):
+        """Who holds the tail, and what is written, once that file is edited."""
+        edit(f'tree/app/src/{name}.cpp', content)
+        text = run('main.qrex', 'diagnostics=true')
+        held = [name for name in ('w', 'x', 'y', 'app') if b'Registration of $enum+ C' in read(f'{TRANSLATED}src/{name}.cpp')]
+        return held, re.findall(r'^Writing: .*/(.*)\.cpp$', text, re.M)
+    for name, content, held, written in [
+            ('w', '@import "app/c.h"\n', 'w', ['w', 'x', 'app']),  # takes it
+            ('w', '', 'x', ['w', 'x', 'app']),  # drops it
+            ('x', '@import "app/plain.h"\n', 'y', ['x', 'y', 'app']),
+            ('w', '@import "app/plain.h"\n', 'y', ['w']),  # a tail without text does not count
+            ('w', '', 'y', ['w'])]:
+        got = after(name, content)
+        expect(got == ([held], written), (name, content, got))
+    # what an error, or a run for one file, kept from being written is written in the next run
+    edit('tree/app/src/w.cpp', '@import "app/c.h"\n')
+    edit('tree/app/src/x.cpp', '$bad\n')
+    run(status=1)
+    expect(after('x', '')[0] == ['w'], 'after an error')
+    edit('tree/app/src/w.cpp', '')
+    run('main.qrex', 'mode=compile', '$COMPILE_FILE_PATH = "tree/app/src/w.cpp"')
+    expect(after('x', 'int x;\n')[0] == ['y'], 'after a run for one file')
+
+
 def test_clean_compile_show():
     write_tree()
     run()

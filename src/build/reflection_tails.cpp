@@ -1,0 +1,85 @@
+#include "build/reflection_tails.h"
+
+namespace qrex {
+
+namespace {
+
+// Goes through the files as a build that translates them all, and deals out the tails as it would.
+class TailWalk {
+ public:
+  TailWalk(const ProjectBuilder& builder, size_t knownFiles)
+      : m_builder(builder), m_knownFiles(knownFiles), m_visited(builder.FileCount()), m_holders(builder.FileCount()) {
+    for (ScannedFile* file : builder.scanned) Visit(*file);
+  }
+  ScannedFile* HolderOf(const ScannedFile& file) const { return m_holders[file.index]; }
+
+ private:
+  void Visit(ScannedFile& file) {
+    if (m_visited[file.index]) return;
+    m_visited[file.index] = true;
+    for (ScannedFile* import : file.imports) Visit(*import);
+    if (file.file.kind != FileKind::Cpp) return;
+    for (const ScannedFile* import : file.imports) {
+      ScannedFile*& holder = m_holders[import->index];
+      if (!holder && Takes(file, *import)) holder = &file;
+    }
+  }
+
+  bool Takes(const ScannedFile& file, const ScannedFile& import) const {
+    if (import.file.kind == FileKind::Cpp) return false;  // holds its own
+    if (MayHoldTail(file.file, import.file)) return true;
+    return import.file.project == file.file.project && !IsKnown(*import.file.pairedSource);
+  }
+
+  bool IsKnown(const ProjectFile& file) const {
+    const auto found = m_builder.scannedByPath.find(file.path);
+    return found != m_builder.scannedByPath.end() && found->second->index < m_knownFiles;
+  }
+
+  const ProjectBuilder& m_builder;
+  const size_t m_knownFiles;
+  std::vector<bool> m_visited;
+  std::vector<ScannedFile*> m_holders;
+};
+
+// The dependency file tells of declarations; that a header has nothing but $type, $init or $uninit shows only when it
+// is translated.
+bool HasTail(ScannedFile& header) {
+  if (header.hasDeclarations) return true;
+  header.WriteGeneratedFile();
+  return header.HasTail();
+}
+
+}  // namespace
+
+void FindTailHolders(ProjectBuilder& builder, size_t knownFiles) {
+  const TailWalk walk(builder, knownFiles);
+  for (const auto& [path, file] : builder.scannedByPath) file->tailHolder = walk.HolderOf(*file);
+}
+
+bool TailsMoved(ScannedFile& file) {
+  if (file.lostTail) return true;
+  for (ScannedFile* import : file.imports) {
+    if (import->file.kind == FileKind::Cpp) continue;
+    const bool holds = import->tailHolder == &file;
+    const bool takes = !import->registered && MayHoldTail(file.file, import->file);
+    if (holds == takes) continue;
+    if (HasTail(*import)) return true;
+    if (takes) import->tailHolder = &file;
+  }
+  return false;
+}
+
+void ForgetUnsettledTails(ProjectBuilder& builder) {
+  const TailWalk walk(builder, builder.FileCount());
+  for (const auto& [path, file] : builder.scannedByPath) {
+    if (file->lostTail) file->translationTime = 0;
+    ScannedFile* const holder = walk.HolderOf(*file);
+    const bool hasNone = file->translated && !file->HasTail();
+    if (holder == file->tailHolder || hasNone) continue;
+    if (holder) holder->translationTime = 0;
+    if (file->tailHolder) file->tailHolder->translationTime = 0;
+  }
+}
+
+}  // namespace qrex
