@@ -114,13 +114,14 @@ void ProjectParser::Find(Search& search, ProjectFolder& folder, const std::strin
 
 void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFolder& folder,
                               const std::string& directory) {
-  std::string realPath;
-  if (!RealPathOf(PathJoin(root, directory), realPath)) return;
+  std::string searched = PathJoin(root, directory), realPath;
+  if (searched.empty()) searched = ".";  // the folder of the run, when the search leads above the root
+  if (!RealPathOf(searched, realPath)) return;
   if (std::find(search.open.begin(), search.open.end(), realPath) != search.open.end()) return;  // a link to itself
   if (search.open.size() >= kMaxNesting) throw LexScannerException("Directories nested too deeply", current);
   search.open.push_back(realPath);
   std::vector<std::string> names;
-  FileOrDirIterator entries(PathJoin(root, directory) + "/*");
+  FileOrDirIterator entries(searched + "/*");
   while (const IFileOrDirInfo* entry = entries.Next()) {
     const std::string name = entry->Name();
     if (name == "." || name == ".." || entry->IsHidden() || entry->IsSystem()) continue;

@@ -197,6 +197,12 @@ TEST_F(ProjectTest, Searches) {
   AssertTree("{ \"s/c.h\" \"s/g.h\" \"*.h\" * }",
              "app/s/c.h=s/c.h app/s/g.h=s/g.h app/a.h app/f.h s{t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
   AssertTree("{ \"none\" { \"*\" * } }", "none{}");
+  // Above the roots lies the folder of the run.
+  Write("here.h", "");
+  AssertTree("{ \"../..\" { \"*.h\" } }", "..{../here.h}");
+  settings.virtualTree = {"tree", "."};
+  AssertTree("{ \"..\" { \"h*.h\" } }", "${here.h}");
+  settings.virtualTree = {"tree", "more"};
   std::ofstream("tree/app/s/\xFF.txt");
   AssertTree("{ \"*.cpp\" * }", "app/b.cpp");
   AssertError(std::string(kHeads) + "{ \"*\" * }", "(3) : Path is not valid UTF-8 : app/s/\xFF.txt");
