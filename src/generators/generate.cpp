@@ -53,13 +53,29 @@ void GenerateGccProject(Project& project) {
   Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
 }
 
+std::unordered_set<std::string> ProjectMakeFiles(const Workspace& workspace) {
+  std::unordered_set<std::string> names;
+  for (const auto& project : workspace.projects) {
+    if (project->exported) continue;
+    for (const auto& config : project->configs) names.insert(MakeFileName(project->name, *config));
+  }
+  return names;
+}
+
 void GenerateGccWorkspace(const Workspace& workspace) {
   if (workspace.projects.empty()) return;
+  const std::unordered_set<std::string> taken = ProjectMakeFiles(workspace);
   for (const auto& config : workspace.projects.front()->configs) {
-    Generate(MakeFileName(workspace.name, *config), WriteWorkspaceMakeFile, workspace, *config);
+    const std::string name = MakeFileName(workspace.name, *config);
+    if (taken.contains(name)) {  // over the project's, it would call itself
+      TraceWriter() << "Error : Make file " << name << " of the workspace has the name of a project's - not written\n";
+      continue;
+    }
+    Generate(name, WriteWorkspaceMakeFile, workspace, *config);
   }
   Generate("makefile", WriteTopMakeFile, workspace);
   Generate(workspace.name + ".make", WriteTopMakeFile, workspace);
+  upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies
   Generate(workspace.name + ".workspace", WriteCodeBlocksWorkspace, workspace);
   Generate(workspace.name + ".geany", WriteGeanyProject, workspace);
 }

@@ -195,6 +195,22 @@ TEST_F(MakeFilesTest, WorkspaceAndTop) {
                              "rtranslate2:\n\tmake translate2 -f make_all_x64_Release\n\n");
 }
 
+// A project may have the name of its workspace. The other configurations of the workspace's have their files.
+TEST_F(MakeFilesTest, ProjectNamedLikeItsWorkspace) {
+  AddFile("tree/base/src/base.qrpj",
+          "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"base\" config { \"Debug|x64\" \"Odd|x64\" } { }");
+  AddProject("all", "Application", "subproj { \"base\" } qrex { \"all.c\" }");
+  Load("all/src/all.qrpj");
+  Generate();
+  EXPECT_EQ("# Project : all\n", LinesOf("make_all_x64_Debug", "# Project"));
+  EXPECT_EQ("# Workspace : all\n", LinesOf("make_all_x64_Odd", "# Workspace"));
+  const std::string refusal =
+      "Error : Make file make_all_x64_Debug of the workspace has the name of a project's - not written\n";
+  const size_t first = trace.find(refusal + "Writing make_all_x64_Odd\n");
+  ASSERT_NE(std::string::npos, first) << trace;
+  EXPECT_NE(std::string::npos, trace.find(refusal + "Skipping make_all_x64_Odd\n", first)) << trace;
+}
+
 }  // namespace
 
 }  // namespace qrex

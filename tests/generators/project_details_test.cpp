@@ -50,6 +50,11 @@ TEST_F(ProjectDetailsTest, MissingDependency) {
   LoadAndGenerate(CompilerKind::gcc);
   EXPECT_TRUE(trace.ends_with("Writing all.make\n" + missing + "Writing all.workspace\nWriting all.geany\n")) << trace;
   AssertHolds("app.cbp", "\t\t\t\t\t<Add option=\"-lold\" />\n");
+
+  AddProject("app", "Application", "subproj { \"old\" } qrex { }");  // a second pass, over the same names
+  LoadAndGenerate(CompilerKind::gcc);
+  EXPECT_TRUE(trace.ends_with("Skipping all.make\n" + missing + "Skipping all.workspace\nSkipping all.geany\n"))
+      << trace;
 }
 
 TEST_F(ProjectDetailsTest, PrepackagedProjectsInSolutions) {
