@@ -119,12 +119,9 @@ void ConfigParser::ParseStatement() {
         m_settings.mode = static_cast<RunMode>(i);
         return;
       }
-    } else {
-      for (int i = 0; i <= static_cast<int>(CompilerKind::clang); ++i) {
-        if (word != CompilerKeyword(static_cast<CompilerKind>(i))) continue;
-        m_settings.compiler = static_cast<CompilerKind>(i);
-        return;
-      }
+    } else if (const auto compiler = FindCompiler(word)) {
+      m_settings.compiler = *compiler;
+      return;
     }
     throw LexScannerException("Invalid option : " + Printed(token), token);
   }

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <map>
+#include <optional>
 #include <string>
 #include <vector>
 
@@ -15,6 +16,7 @@ enum class CompilerKind { vc6, vc8, vc9, vc10, vc11, vc12, vc14, gcc, winegcc, c
 inline bool IsVisualCpp(CompilerKind kind) { return kind < CompilerKind::gcc; }
 inline bool IsGccFamily(CompilerKind kind) { return kind >= CompilerKind::gcc; }
 std::string_view CompilerKeyword(CompilerKind kind);  // "vc6" .. "clang"
+std::optional<CompilerKind> FindCompiler(std::string_view keyword);
 
 struct PlatformEnvironment {
   std::string PATH, INCLUDE, LIB;  // `;`-separated lists

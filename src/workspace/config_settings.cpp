@@ -1,5 +1,7 @@
 #include "driver/config_settings.h"
 
+#include <algorithm>
+
 #include "platform/console.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -8,10 +10,17 @@
 
 namespace qrex {
 
-std::string_view CompilerKeyword(CompilerKind kind) {
-  static constexpr std::string_view kWords[] = {"vc6",  "vc8",  "vc9", "vc10",    "vc11",
-                                                "vc12", "vc14", "gcc", "winegcc", "clang"};
-  return kWords[static_cast<size_t>(kind)];
+namespace {
+constexpr std::string_view kCompilers[] = {"vc6",  "vc8",  "vc9", "vc10",    "vc11",
+                                           "vc12", "vc14", "gcc", "winegcc", "clang"};
+}
+
+std::string_view CompilerKeyword(CompilerKind kind) { return kCompilers[static_cast<size_t>(kind)]; }
+
+std::optional<CompilerKind> FindCompiler(std::string_view keyword) {
+  const auto* const found = std::find(std::begin(kCompilers), std::end(kCompilers), keyword);
+  if (found == std::end(kCompilers)) return std::nullopt;
+  return static_cast<CompilerKind>(found - std::begin(kCompilers));
 }
 
 const PlatformEnvironment* ConfigSettings::Environment() const {

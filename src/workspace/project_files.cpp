@@ -228,7 +228,7 @@ void ProjectParser::ParseExclude(const Files& files) {
     for (ProjectFile* file : files) file->excluded = true;
     return;
   }
-  for (ProjectConfig* config : ReadScope()) {
+  for (ProjectConfig* config : ReadScope().configs) {
     for (ProjectFile* file : files) file->RecordOf(*config).excluded = true;
   }
 }
@@ -242,10 +242,11 @@ void ProjectParser::ParseFileOption(const Files& files) {
   Advance();
   if (!current.Is("cpp")) throw LexScannerException("Expected 'cpp' when read " + Printed(current), current);
   Advance();
-  const Configs configs = ReadScope();
+  const Scope scope = ReadScope();
+  if (scope.isForOtherCompilers) return SkipBlock();
   if (KeepsRawText()) {
     const std::string block = ReadRawBlock();
-    for (ProjectConfig* config : configs) {
+    for (ProjectConfig* config : scope.configs) {
       for (ProjectFile* file : files) {
         FileConfigRecord& record = file->RecordOf(*config);
         std::string& text = add ? record.addText : record.removeText;
@@ -255,7 +256,7 @@ void ProjectParser::ParseFileOption(const Files& files) {
     return;
   }
   const SwitchChanges changes = ReadCompilerSwitches(*this, !add);
-  for (ProjectConfig* config : configs) {
+  for (ProjectConfig* config : scope.configs) {
     for (ProjectFile* file : files) {
       FileConfigRecord& record = file->RecordOf(*config);
       if (add) {

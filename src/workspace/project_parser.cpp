@@ -214,7 +214,7 @@ void ProjectParser::ParseToolFiles() {
 
 void ProjectParser::ParseBuildEvent(BuildEvent ProjectConfig::*event) {
   Advance();
-  const Configs configs = ReadScope();
+  const Configs configs = ReadScope().configs;
   RequireBrace();
   BuildEvent read;
   read.present = true;
@@ -240,7 +240,7 @@ void ProjectParser::ParseGeneral() {
                                                "ManagedExtensions",
                                                "WholeProgramOptimization"};
   Advance();
-  const Configs configs = ReadScope();
+  const Configs configs = ReadScope().configs;
   RequireBrace();
   while (current.kind != kCloseBrace) {
     if (current.kind != kIdentifier) {
@@ -262,11 +262,11 @@ void ProjectParser::ParseGeneral() {
 
 // --- Scopes and options
 
-ProjectParser::Configs ProjectParser::ReadScope() {
-  Configs configs;
+ProjectParser::Scope ProjectParser::ReadScope() {
+  Scope scope;
   if (current.kind != kOpenParen) {
-    for (const auto& config : m_project.configs) configs.push_back(config.get());
-    return configs;
+    for (const auto& config : m_project.configs) scope.configs.push_back(config.get());
+    return scope;
   }
   std::vector<std::string> specs;
   do {
@@ -280,10 +280,12 @@ ProjectParser::Configs ProjectParser::ReadScope() {
   Advance();
   for (const auto& config : m_project.configs) {
     if (std::any_of(specs.begin(), specs.end(), [&](const std::string& spec) { return IsSelected(*config, spec); })) {
-      configs.push_back(config.get());
+      scope.configs.push_back(config.get());
     }
   }
-  return configs;
+  scope.isForOtherCompilers =
+      std::all_of(specs.begin(), specs.end(), [&](const std::string& spec) { return NeedsOtherCompiler(spec); });
+  return scope;
 }
 
 bool ProjectParser::IsSelected(const ProjectConfig& config, std::string_view spec) const {
@@ -298,6 +300,18 @@ bool ProjectParser::IsSelected(const ProjectConfig& config, std::string_view spe
     if (bar == std::string_view::npos) return true;
     spec.remove_prefix(bar + 1);
   }
+}
+
+// A part of it is the keyword of another compiler, and no configuration has something of that name.
+bool ProjectParser::NeedsOtherCompiler(std::string_view spec) const {
+  std::vector<std::string> parts;
+  SplitString(spec, parts, "|");
+  return std::any_of(parts.begin(), parts.end(), [&](const std::string& part) {
+    const auto compiler = FindCompiler(part);
+    return compiler && *compiler != m_project.settings->compiler &&
+           std::none_of(m_project.configs.begin(), m_project.configs.end(),
+                        [&](const auto& config) { return IsSelected(*config, part); });
+  });
 }
 
 bool ProjectParser::KeepsRawText() const {
@@ -332,6 +346,15 @@ std::string ProjectParser::ReadRawBlock() {
   return text;
 }
 
+// What another compiler's switches look like is not known here: they are tokens, as in a raw block.
+void ProjectParser::SkipBlock() {
+  RequireBrace();
+  for (; current.kind != kCloseBrace; Advance()) {
+    if (current.kind == kEndOfText) throw LexScannerException("Unexpected end of file", current);
+  }
+  Advance();
+}
+
 void ProjectParser::AppendRawBlock(const Configs& configs, std::string ProjectConfig::*text) {
   const std::string block = ReadRawBlock();
   for (ProjectConfig* config : configs) config->*text = ForConfig(config->*text + " " + block, *config);
@@ -355,14 +378,16 @@ bool ProjectParser::ParseOptions(bool add) {
     return false;
   }
   Advance();
-  const Configs configs = ReadScope();
-  if (isLink) {
-    AppendRawBlock(configs, &ProjectConfig::linkerText);
+  const Scope scope = ReadScope();
+  if (scope.isForOtherCompilers) {
+    SkipBlock();
+  } else if (isLink) {
+    AppendRawBlock(scope.configs, &ProjectConfig::linkerText);
   } else if (isCpp && add && KeepsRawText()) {
-    AppendRawBlock(configs, &ProjectConfig::compilerText);
+    AppendRawBlock(scope.configs, &ProjectConfig::compilerText);
   } else {
     const SwitchChanges changes = isCpp ? ReadCompilerSwitches(*this, !add) : ReadResourceSwitches(*this, !add);
-    for (ProjectConfig* config : configs) {
+    for (ProjectConfig* config : scope.configs) {
       OptionMap& options = isCpp ? config->compilerOptions : config->resourceOptions;
       changes.Apply(options);
       SubstituteInOptions(options, *config);

@@ -41,9 +41,15 @@ class ProjectParser : public MpfwParser {
   void ParseBuildEvent(BuildEvent ProjectConfig::*event);
   void ParseGeneral();
   bool ParseOptions(bool add);
-  Configs ReadScope();
+  struct Scope {
+    Configs configs;                   // those that it selects
+    bool isForOtherCompilers = false;  // nor could it select any in this run
+  };
+  Scope ReadScope();
   bool IsSelected(const ProjectConfig& config, std::string_view spec) const;
+  bool NeedsOtherCompiler(std::string_view spec) const;
   std::string ReadRawBlock();
+  void SkipBlock();
   void AppendRawBlock(const Configs& configs, std::string ProjectConfig::*text);
   std::string ForConfig(std::string text, const ProjectConfig& config) const;  // $(PLATFORM), $(CONFIG)
   void SubstituteInOptions(OptionMap& options, const ProjectConfig& config) const;

@@ -132,6 +132,42 @@ TEST_F(ProjectTest, ScopesAndRawBlocks) {
                       [](const ProjectConfig& config) { return config.linkerText; }));
 }
 
+// A block for another compiler holds tokens up to its bracket, in whatever form that compiler wants its switches.
+TEST_F(ProjectTest, BlocksForOtherCompilers) {
+  const std::string statements =
+      "+cpp (\"gcc\", \"clang|Debug\") { -std=c++17 -D'a}' } +cpp (\"vc9\", \"vc14|x64\") { /O2 /GR- }\n"
+      "-cpp (\"vc9|Debug\") { /GR } -cpp (\"gcc\") { /GS } +rc (\"gcc\") { -x } +link (\"gcc\") { -lm } ";
+  const auto print = [](const ProjectConfig& config) {
+    return config.compilerText + "|" + Printed(config.compilerOptions) + "|" + config.linkerText;
+  };
+  const std::string gccBlocks = statements.substr(0, statements.find("+rc"));
+  EXPECT_EQ("Debug|x64: -std=c++17 -D'a}'||\nRelease|x64: -std=c++17 -D'a}'||\nDebug|Win: -std=c++17 -D'a}'||\n",
+            OfConfigs(gccBlocks, print));
+  settings.compiler = CompilerKind::vc9;
+  const char* const kOptimised = "|Optimization=2;RuntimeTypeInfo=false;|\n";
+  EXPECT_EQ(std::string("Debug|x64:|Optimization=2;|\nRelease|x64:") + kOptimised + "Debug|Win:|Optimization=2;|\n",
+            OfConfigs(statements, print));
+  const Project& project = Load(std::string(kHeads) + kConfigs +
+                                "{ \"a.cpp\" : +cpp (\"gcc\") { -w }, -cpp (\"vc6\") { -g }, exclude (\"vc9|Win\") }");
+  EXPECT_EQ(1u, project.filesByPath.at("app/a.cpp")->configRecords.size());
+
+  // What could be meant for this compiler is read.
+  for (const auto& [scope, expected] :
+       std::initializer_list<std::pair<const char*, bool>>{{"\"gcc\"", true},
+                                                           {"\"gcc|none\", \"vc8\"", true},
+                                                           {"\"gcc\", \"none\"", false},
+                                                           {"\"vc9|none\"", false},
+                                                           {"\"none\"", false},
+                                                           {"\"gcc\", \"vc9\"", false}}) {
+    const std::string block = " +cpp (" + std::string(scope) + ") { -w } { }";
+    EXPECT_EQ(expected, TryLoad(std::string(kHeads) + kConfigs + block) != nullptr) << scope;
+    // A tag may have the name of a compiler.
+    EXPECT_EQ(nullptr, TryLoad(std::string(kHeads) + "config { \"a|b\" [\"gcc\" \"vc8\"] }" + block)) << scope;
+  }
+  AssertError(std::string(kHeads) + "+cpp (\"gcc\") -w", "(3) : Expected { when read -");
+  AssertError(std::string(kHeads) + "+cpp (\"gcc\") { -w", "(3) : Unexpected end of file");
+}
+
 TEST_F(ProjectTest, OptionsOfConfigurations) {
   settings.compiler = CompilerKind::vc9;
   EXPECT_EQ(
