@@ -1,44 +1,18 @@
 #!/usr/bin/env python3
 """Builds the examples with the tools of the gcc family, those with reflection against the runtime, and runs their
-programs."""
+programs: by the tool itself and by make. The same sources and descriptions serve every compiler."""
 
 import shutil
 import sys
+import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, holds, in_workspace, run_tests  # noqa: E402
+from workspace_fixture import Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
 
 ROOT = Path(__file__).resolve().parents[2]
-
-
-def build(workspace, name, program, *arguments):
-    """Builds a copy of the example; what its program writes."""
-    shutil.copytree(ROOT / "examples" / name, workspace.folder, dirs_exist_ok=True)
-    settings = workspace.path(f"{name}.qrex")
-    settings.write_text(settings.read_text().replace("../../runtime", str(ROOT / "runtime")))
-    holds(workspace.run(settings.name, *arguments), "Completed.")
-    return workspace.shell(f"out/lib/x64/Debug/{program}")
-
-
-@in_workspace({}, "g++")
-def first(workspace):
-    output = build(workspace, "first", "app", "translateOnly=false", 'PATH("x64") = { "/usr/bin" "/bin" }',
-                   'INCLUDE("x64") = { "/usr/include" }', 'LIB("x64") = { "/usr/lib" }')
-    holds(output, "First: error codes\napp for x64, Debug, on Linux\n")
-
-
-@in_workspace({}, "g++")
-def evolution(workspace):
-    equal(build(workspace, "evolution", "notes"),
-          'release 1: "call the harbour", 90000 ms, 3 words, tags: urgent\n'
-          'release 2: "call the harbour", 90000 ms, 3 words, tags: sea today\n'
-          'release 3: "two words", 1500 ms, 2 words, tags: new\n')
-
-
-@in_workspace({}, "g++")
-def shapes(workspace):
-    equal(build(workspace, "shapes", "app"), """class geo::Box
+COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
+SHAPES = """class geo::Box
     geo::Point[2] corners
 class geo::Canvas
     float64 width
@@ -66,7 +40,78 @@ a pair, used 1 times
 measured 6, in metres 2.54
 variable geo::conversions
 canvas 6 6, a share 2, wider 12, a share 4, calculated 2 times
-""")
+"""
+NOTES = """release 1: "call the harbour", 90000 ms, 3 words, tags: urgent
+release 2: "call the harbour", 90000 ms, 3 words, tags: sea today
+release 3: "two words", 1500 ms, 2 words, tags: new
+"""
+CODES = """First: error codes
+app for x64, Debug, on Linux
+[NotFound] 2 The First archive was not found
+[Denied] 5 Access to the archive is denied
+[Full] 112 The disk is full
+"""
+# Folder, name of the workspace, program, what it writes.
+EXAMPLES = [("first", "first", "app", CODES), ("evolution", "evolution", "notes", NOTES),
+            ("shapes", "geometry", "app", SHAPES),
+            ("tour", "tour", "app", (ROOT / "examples/tour/expected.txt").read_text())]
 
 
-run_tests([first, evolution, shapes])
+def copy(binary, folder):
+    """A workspace with a copy of the example."""
+    workspace = Workspace(binary, {})
+    shutil.copytree(ROOT / "examples" / folder, workspace.folder, dirs_exist_ok=True,
+                    ignore=shutil.ignore_patterns("out", "qrexsource", "x64", "*.guids"))
+    for settings in workspace.folder.glob("*.qrex"):
+        settings.write_text(settings.read_text().replace("../../runtime", str(ROOT / "runtime")))
+    return workspace
+
+
+def a_run_builds_them(binary):
+    need("g++")
+    for folder, name, program, expected in EXAMPLES[:-1]:  # that of the tour stands in runtime_test.py
+        with copy(binary, folder) as workspace:
+            holds(workspace.run(f"{name}.qrex"), "Completed.")
+            equal(workspace.shell(f"out/lib/x64/Debug/{program}"), expected)
+
+
+def make_builds_them(binary):
+    need("g++", "make")
+    for folder, name, program, expected in EXAMPLES:
+        with copy(binary, folder) as workspace:
+            workspace.run(f"{name}.qrex", "mode=gen")
+            for command in ("make", "make -j2") if folder == "first" else ("make -j2",):
+                workspace.shell(command)
+                equal(workspace.shell(f"out/lib/x64/Debug/{program}"), expected)
+                before = {**workspace.times("x64/**/*"), **workspace.times("out/lib/**/*")}
+                lacks(workspace.shell("make"), "g++")
+                equal(workspace.changed(before, "x64/**/*") + workspace.changed(before, "out/lib/**/*"), [])
+                workspace.shell("make clean")
+                equal([path for top in ("x64", "out/lib") for path in workspace.path(top).rglob("*") if path.is_file()], [])
+
+
+def one_description_serves_every_compiler(binary):
+    for folder, name, program, _ in EXAMPLES:
+        with copy(binary, folder) as workspace:
+            for compiler in COMPILERS:
+                for arguments in (["mode=gen"], ["translateOnly=true", "rebuildAll=true"]):
+                    output = workspace.run(f"{name}.qrex", f"compiler={compiler}", *arguments)
+                    holds(output, "\nCompleted.")
+                    for word in ("Error", "ERROR", "arning"):
+                        lacks(output, word)
+            generated = list(workspace.folder.iterdir())
+            for path in generated:
+                if path.suffix in (".vcproj", ".vcxproj", ".filters", ".cbp", ".workspace"):
+                    XmlTree.parse(path)
+            equal(len({path.suffix for path in generated} & {".dsp", ".vcproj", ".vcxproj", ".sln", ".cbp"}), 5)
+            # Each has its own switches and none of another's.
+            for suffix, own in ((".dsp", "/GX"), (".vcproj", 'ExceptionHandling="1"'), (".vcxproj", ">Sync<"),
+                                (".cbp", '"-std=c++17"')):
+                text = workspace.path(program + suffix).read_text(encoding="utf-8-sig")
+                holds(text, own)
+                if suffix != ".cbp":
+                    lacks(text, "-std")
+                    lacks(text, "ar rcs")
+
+
+run_tests([a_run_builds_them, make_builds_them, one_description_serves_every_compiler])
