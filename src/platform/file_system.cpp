@@ -119,17 +119,21 @@ bool ReadFile(const std::string& path, std::string& content, Readable kind) {
     errno = EACCES;
     return false;
   }
+  // A file of the proc file system has no size, and one that grows has more: read to the end. Less than the size is a
+  // fault, not the end.
+  const size_t size = static_cast<size_t>(status.st_size);
   content.clear();
-  ReserveText(content,
-              static_cast<size_t>(status.st_size));  // no more than a hint: a pipe has no size, a file may grow
+  ReserveText(content, size);
   char block[65536];
   for (;;) {
     const ssize_t got = read(file.Number(), block, sizeof block);
     if (got < 0 && errno == EINTR) continue;
     if (got < 0) return false;
     content.append(block, static_cast<size_t>(got));
-    const bool isPlainAndRead = S_ISREG(status.st_mode) && static_cast<size_t>(got) < sizeof block;
-    if (got == 0 || isPlainAndRead) return true;
+    if (got > 0 && content.size() == size) return true;
+    if (got > 0) continue;
+    if (content.size() < size) errno = EIO;
+    return content.size() >= size;
   }
 }
 

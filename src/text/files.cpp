@@ -284,7 +284,7 @@ File::File(const std::string& path, FileMode mode) {
   if (!Open(path, mode)) throw FileException(platform::kErrorFileNotFound, path);
 }
 
-File::~File() { Close(); }
+File::~File() { CloseStream(); }
 
 bool File::Open(const std::string& path, FileMode mode) {
   static constexpr const char* kModes[] = {"r", "w", "a", "rb", "wb", "ab"};
@@ -315,12 +315,16 @@ void File::Write(const void* data, size_t length) {
 }
 
 void File::Flush() {
-  if (m_stream) std::fflush(m_stream);
+  if (m_stream && std::fflush(m_stream) != 0) throw FileException(platform::kErrorWriteFault, m_path);
 }
 
 void File::Close() {
-  if (m_stream) std::fclose(m_stream);
-  m_stream = nullptr;
+  if (!CloseStream()) throw FileException(platform::kErrorWriteFault, m_path);
+}
+
+bool File::CloseStream() {
+  std::FILE* const stream = std::exchange(m_stream, nullptr);
+  return !stream || std::fclose(stream) == 0 || !IsWritable();
 }
 
 bool File::IsWritable() { return m_mode != FileMode::ReadText && m_mode != FileMode::ReadBinary; }

@@ -88,11 +88,12 @@ class File : public IFile {
   int64_t Position() override;
   bool Seek(int64_t position) override;
   void Write(const void* data, size_t length) override;
-  void Flush() override;
+  void Flush() override;  // this and Close raise FileException where bytes that were written before get lost
   void Close() override;
   bool IsWritable() override;
 
  private:
+  bool CloseStream();  // false: bytes got lost
   std::FILE* m_stream = nullptr;
   FileMode m_mode = FileMode::Closed;
   std::string m_path;

@@ -23,9 +23,7 @@ std::string WithCarriageReturns(std::string_view text) {
 }
 
 GeneratedFile::~GeneratedFile() {
-  if (!m_isSpilled) return;
-  m_beside.Close();
-  platform::RemoveFile(m_besidePath);
+  if (m_isSpilled) platform::RemoveFile(m_besidePath);
 }
 
 void GeneratedFile::Write(const void* data, size_t length) {
@@ -39,30 +37,50 @@ void GeneratedFile::Write(const void* data, size_t length) {
   }
 }
 
-void GeneratedFile::Spill() {
-  if (!m_isSpilled) {
-    CreateDirectories(m_path, false);
-    m_besidePath = BesidePath(m_path);
-    if (!m_beside.Open(m_besidePath, FileMode::WriteBinary)) throw FileException(m_path);
-    m_isSpilled = true;
+template <typename Step>
+void GeneratedFile::Try(Step step) {
+  if (m_failure) return;
+  try {
+    step();
+  } catch (const FileException& exception) {
+    m_failure = exception.errorCode;
   }
-  m_beside.Write(m_text.data(), m_text.size());
+}
+
+void GeneratedFile::RaiseFailure() const {
+  if (m_failure) throw FileException(*m_failure, m_path);
+}
+
+void GeneratedFile::Spill() {
+  Try([this] {
+    if (!m_isSpilled) {
+      CreateDirectories(m_path, false);
+      m_besidePath = BesidePath(m_path);
+      if (!m_beside.Open(m_besidePath, FileMode::WriteBinary)) throw FileException(m_path);
+      m_isSpilled = true;
+    }
+    m_beside.Write(m_text.data(), m_text.size());
+  });
   m_text.clear();
 }
 
 std::string GeneratedFile::Text() {
-  if (!m_isSpilled) return m_text;
+  if (!m_isSpilled && !m_failure) return m_text;
   Spill();
-  m_beside.Flush();
   std::string text;
-  ReadWholeFile(text, m_besidePath);
+  Try([&] {
+    m_beside.Flush();
+    if (!ReadWholeFile(text, m_besidePath)) throw FileException(m_path);
+  });
+  RaiseFailure();
   return text;
 }
 
 void GeneratedFile::Commit() {
-  if (!m_isSpilled) return ReplaceFile(m_path, m_text, ReadOnlyTarget::Replace);
+  if (!m_isSpilled && !m_failure) return ReplaceFile(m_path, m_text, ReadOnlyTarget::Replace);
   Spill();
-  m_beside.Close();
+  Try([this] { m_beside.Close(); });
+  RaiseFailure();
   if (!platform::RenameFile(m_besidePath, m_path)) throw FileException(m_path);
   m_isSpilled = false;
 }
@@ -95,12 +113,15 @@ void ChangeReadOnly(const std::string& path, bool readOnly) {
 
 bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly) {
   CreateDirectories(to, false);
-  if (LastWriteTime(from) <= LastWriteTime(to)) return true;
-  ChangeReadOnly(to, false);
-  if (!CopyFile(from, to, false)) {
+  auto fail = [] {
     TraceWriter() << "...Copy file failed\n";
     return false;
-  }
+  };
+  platform::FileInfo source;
+  if (!platform::Stat(from, source)) return platform::IsNotFound(platform::LastError()) || fail();
+  if (!source.isPlain || source.writeTime <= LastWriteTime(to)) return true;
+  ChangeReadOnly(to, false);
+  if (!CopyFile(from, to, false)) return fail();
   TouchFile(to, false);
   if (readOnly) ChangeReadOnly(to, true);
   return true;

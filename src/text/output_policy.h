@@ -2,6 +2,7 @@
 // action has its line on the trace log.
 #pragma once
 
+#include <optional>
 #include <string>
 
 #include "text/files.h"
@@ -20,24 +21,29 @@ int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);  // the s
 std::string WithCarriageReturns(std::string_view text);
 void AppendWithCarriageReturns(std::string& out, std::string_view text);
 
-// A generated file in the making, with CR LF line ends. It replaces the target as a whole when it is committed; without
-// that it leaves no trace. A long text goes to the file beside the target as it comes and is not kept in memory.
+// A generated file while it is composed, with CR LF line ends. It replaces the target as a whole when it is committed;
+// without that it leaves no trace. A long text goes to the file beside the target as it comes and is not kept in memory.
+// Writers flush in their destructors, so Write never raises: what it could not write fails Text and Commit.
 class GeneratedFile : public IOutputStream {
  public:
   explicit GeneratedFile(std::string path) : m_path(std::move(path)) {}
   ~GeneratedFile() override;
-  void Write(const void* data, size_t length) override;  // raises FileException
+  void Write(const void* data, size_t length) override;
   void Flush() override {}
-  std::string Text();  // all that was written
+  std::string Text();  // all that was written; raises FileException
   void Commit();       // raises FileException. A read-only target is replaced like any other
 
  private:
-  void Spill();
+  void Spill();  // what is in memory to the file beside the target
+  template <typename Step>
+  void Try(Step step);
+  void RaiseFailure() const;
   const std::string m_path;
   std::string m_text;
   File m_beside;
   std::string m_besidePath;
   bool m_isSpilled = false;
+  std::optional<uint32_t> m_failure;  // the error code of the first step that failed
 };
 
 // Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time.

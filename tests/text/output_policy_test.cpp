@@ -2,8 +2,11 @@
 
 #include "text/output_policy.h"
 
+#include <sys/resource.h>
+
 #include <regex>
 
+#include "platform/system.h"
 #include "text/scope_timer.h"
 #include "workspace/workspace_fixture.h"
 
@@ -59,6 +62,28 @@ TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
       trace);
   EXPECT_EQ("old", Read("flagged"));
   EXPECT_FALSE(FileExists(BesidePath("folder")) || FileExists(BesidePath("flagged")));
+}
+
+// Beyond a limit of file sizes, as on a full disk: within the text, and in the last bytes, which only the close writes.
+TEST_F(OutputPolicyTest, WhatIsGeneratedIsCommittedWholeOrNotAtAll) {
+  platform::FailWritesBeyondLimit();
+  rlimit before;
+  getrlimit(RLIMIT_FSIZE, &before);
+  const std::string text(300 << 10, 't');
+  for (rlim_t missing : {rlim_t{1}, rlim_t{100 << 10}}) {
+    Write("target", "old");
+    const rlimit limit{text.size() - missing, before.rlim_max};
+    setrlimit(RLIMIT_FSIZE, &limit);
+    {
+      GeneratedFile generated("target");
+      generated.Write(text.data(), text.size());
+      generated.Write(text.data(), 0);
+      EXPECT_THROW(generated.Commit(), FileException) << missing;
+    }
+    setrlimit(RLIMIT_FSIZE, &before);
+    EXPECT_EQ("old", Read("target"));
+    EXPECT_FALSE(FileExists(BesidePath("target")));
+  }
 }
 
 TEST_F(OutputPolicyTest, CopiesWhatIsNewer) {
