@@ -16,6 +16,7 @@ int main(int argc, char** argv) {
   const std::vector<std::string> arguments(argv, argv + argc);
   int status = 1;
   qrex::platform::FillStandardHandles();
+  qrex::platform::FailWritesBeyondLimit();
   qrex::platform::TuneHeap();
   qrex::platform::BufferStdout();
   qrex::platform::RunOnStack(kStackSize, [&] { status = qrex::RunCommandLine(arguments); });

@@ -12,8 +12,9 @@ struct Mapping {
   int number;
   uint32_t code;
 };
-constexpr Mapping kMappings[] = {{ENOENT, 2}, {ENOTDIR, 3}, {EMFILE, 4},  {EACCES, 5},   {EPERM, 5},
-                                 {EISDIR, 5}, {EROFS, 19},  {EEXIST, 80}, {ENOSPC, 112}, {ENAMETOOLONG, 206}};
+constexpr Mapping kMappings[] = {{ENOENT, 2},   {ENOTDIR, 3},        {EMFILE, 4}, {EACCES, 5},
+                                 {EPERM, 5},    {EISDIR, 5},         {EROFS, 19}, {EEXIST, 80},
+                                 {ENOSPC, 112}, {ENAMETOOLONG, 206}, {EFBIG, 223}};
 constexpr uint32_t kGeneralFailure = 31;
 
 struct Sentence {
@@ -31,6 +32,7 @@ constexpr Sentence kSentences[] = {
     {80, "The file exists."},
     {112, "There is not enough space on the disk."},
     {206, "The filename or extension is too long."},
+    {223, "The file size exceeds the limit allowed and cannot be saved."},
 };
 
 }  // namespace

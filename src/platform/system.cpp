@@ -210,6 +210,11 @@ void RunOnStack(size_t bytes, const std::function<void()>& body) {
   if (run.failure) std::rethrow_exception(run.failure);
 }
 
+// A handler, since tools would inherit that the signal is ignored.
+void FailWritesBeyondLimit() {
+  std::signal(SIGXFSZ, [](int) {});
+}
+
 // The heap begins with a step that holds most runs, in large pages: to be given memory page by page took up to half of
 // a run's time. What lies before the first large page that is untouched so far is left alone. Large blocks come from
 // the heap too.

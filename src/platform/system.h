@@ -29,6 +29,8 @@ LocalTime CurrentLocalTime();
 
 // Runs `body` to its end on a stack of the given size; memory is only used as the stack grows. Exceptions go on.
 void RunOnStack(size_t bytes, const std::function<void()>& body);
+// A write beyond the user's limit of file sizes fails from now on, where it would end the process.
+void FailWritesBeyondLimit();
 void TuneHeap();  // for a short run that fills much memory: take it in large steps
 
 }  // namespace qrex::platform
