@@ -143,6 +143,7 @@ bool QrexParser::TranslateAt() {
 }
 
 void QrexParser::OpenNameSpace() {
+  CheckNesting(m_savedDepths.size());
   Advance();
   const char* const position = current.text.begin;
   std::string name;
@@ -200,6 +201,11 @@ std::string QrexParser::RequireIdentifier(std::string_view what) {
 }
 
 void QrexParser::Fail(std::string message) const { throw LexScannerException(std::move(message), current); }
+
+void QrexParser::CheckNesting(size_t levels) const {
+  constexpr size_t kMaxNesting = 1000;
+  if (levels >= kMaxNesting) Fail("Declarations nested too deeply");
+}
 
 void QrexParser::SkipToMatching(int32_t open, int32_t close, std::string_view atEnd) {
   for (int64_t depth = 0;; Advance()) {

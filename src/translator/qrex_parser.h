@@ -68,6 +68,7 @@ class QrexParser : public ExpressionParser {
   bool AcceptWord(std::string_view word);
   std::string RequireIdentifier(std::string_view what = "identifier");  // advances
   [[noreturn]] void Fail(std::string message) const;                    // at the current token
+  void CheckNesting(size_t levels) const;  // fails where declarations or name spaces are as deep as may be
   // From an opening bracket to its matching closing one, which becomes the current token. Failure: `atEnd`.
   void SkipToMatching(int32_t open, int32_t close, std::string_view atEnd);
   // The same for < >, where `>>` closes two levels.
@@ -167,7 +168,7 @@ class QrexParser : public ExpressionParser {
 class NestingGuard {
  public:
   explicit NestingGuard(QrexParser& parser) : m_parser(parser) {
-    if (parser.nesting >= 1000) parser.Fail("Declarations nested too deeply");
+    parser.CheckNesting(static_cast<size_t>(parser.nesting));
     ++parser.nesting;
   }
   ~NestingGuard() { --m_parser.nesting; }

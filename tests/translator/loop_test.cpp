@@ -88,7 +88,10 @@ TEST_F(LoopTest, InitAndUninit) {
 }
 
 TEST_F(LoopTest, ErrorsOfDirectives) {
+  std::string nested;
+  for (int i = 0; i < 1001; ++i) nested += "namespace n {\n";
   AssertErrors({
+      {nested, 1001, "Declarations nested too deeply"},
       {"\n}", 2, "Can't match }"},
       {"{ }\n}", 2, "Can't match }"},
       {"\n$bogus x;", 2, "'$bogus' is not a valid directive"},
