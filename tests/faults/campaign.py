@@ -1,0 +1,318 @@
+#!/usr/bin/env python3
+"""Lets the system calls of whole runs go wrong, one after the other, and looks at what the runs leave.
+
+campaign.py BINARY [--short] [--markdown]
+
+Each row of the table is a kind of run and a kind of fault. For each call of that kind (of `--short`: for some) a fresh
+workspace is made and the run is disturbed at that call. What must hold afterwards:
+  - the run did not end in a signal, an abort or without an end (but for those that were killed);
+  - each file that it writes is as before or as it is to be, never a part of it;
+  - where something is missing, the run said so: a line that the undisturbed run does not have;
+  - the next run, undisturbed, ends in the end state of an undisturbed run, and leaves nothing to do.
+Ends with 1 when a row does not keep this."""
+
+import argparse
+import concurrent.futures
+import errno
+import os
+import re
+import shutil
+import subprocess
+import sys
+import tempfile
+import time
+from pathlib import Path
+
+HERE = Path(__file__).resolve().parent
+sys.path.insert(0, str(HERE.parent / "endtoend"))
+from workspace_fixture import SETTINGS, Workspace  # noqa: E402
+
+# The tools: an object is its source, a library or program is what went into it.
+COMPILER = """#!/bin/sh
+eval set -- $(tr -d '\\r' < "${2#@}")
+while [ $# -gt 1 ]; do [ "$1" = -o ] && out=$2; shift; done
+cp "$1" "$out" && chmod u+w "$out"
+"""
+LIBRARIAN = """#!/bin/sh
+eval set -- "$2" $(tr -d '\\r' < "${3#@}")
+out=$1; shift; cat "$@" > "$out"
+"""
+LINKER = """#!/bin/sh
+eval set -- $(tr -d '\\r' < "${1#@}")
+while [ $# -gt 0 ]; do case "$1" in -o) out=$2; shift;; -Xlinker) shift;; -*) ;; *) in="$in $1";; esac; shift; done
+cat $in > "$out"
+"""
+CLASSES = "".join(f"$struct+ S{i} {{ $int32 a; $int32 b; $int32 c; }};\n" for i in range(700))  # above 256 KiB of text
+
+
+def project(target, files, extra=""):
+    return (f'$TARGET_TYPE = "{target}"\n$ROOT_TO_PROJDIR = "@dirname"\nqrex\nconfig {{ "Debug|x64" }}\n'
+            f"{extra}{files}\n")
+
+
+def files():
+    library = project("Static Library", '{ "zoo.h" "big.h" "notes.txt" "src" { "zoo.cpp" "big.cpp" } }')
+    program = project("Console Application", '{ "src" { "app.cpp" "more.cpp" } }', 'subproj { "zoo" }\n')
+    return {
+        "all.qrex": SETTINGS + 'makeExportedHeaderFilesReadOnly = true\nmakeTranslatedFilesReadOnly = true\n',
+        "tree/.qrwsroot": "",
+        "tree/all.qrws": '"all" { "Vesk/vxObject" "zoo" "app" }\n',
+        "tree/Vesk/vxObject/IObject.h": "namespace vesk { $interface+ IObject { }; $interface+ IPersistable : IObject { }; }\n",
+        "tree/Vesk/vxObject/src/vxObject.cpp": '@import "Vesk/vxObject/IObject.h"\n',
+        "tree/Vesk/vxObject/src/vxObject.qrpj": project("Static Library", '{ "IObject.h" "src" { "vxObject.cpp" } }')
+        .replace("@dirname", "Vesk/vxObject"),
+        "tree/zoo/src/zoo.qrpj": library.replace("@dirname", "zoo"),
+        "tree/zoo/zoo.h": '@import "Vesk/vxObject/IObject.h"\n@def legs = 4\n$enum+ Food { hay, fish };\n',
+        "tree/zoo/big.h": '@import "Vesk/vxObject/IObject.h"\n' + CLASSES,
+        "tree/zoo/notes.txt": "plain\n" * 3000,
+        "tree/zoo/src/zoo.cpp": '@import "zoo/zoo.h"\nint legsOfAll = legs;\n',
+        "tree/zoo/src/big.cpp": '@import "zoo/big.h"\n',
+        "tree/app/src/app.qrpj": program.replace("@dirname", "app"),
+        "tree/app/src/app.cpp": '@import "zoo/zoo.h"\n$init { }\nint main() { return legs; }\n',
+        "tree/app/src/more.cpp": "int more;\n",
+        "tools/gcc-4": COMPILER,
+        "tools/ar": LIBRARIAN,
+        "tools/g++": LINKER,
+    }
+
+
+TRANSLATE = ["mode=build", "compiler=gcc", "translateOnly=true"]
+BUILD = ["mode=build", "compiler=gcc"]
+RUNS = {  # name: arguments, and what stands there before
+    "translate": (TRANSLATE, None),
+    "translate again": (TRANSLATE, TRANSLATE),
+    "build": (BUILD, None),
+    "build again": (BUILD, BUILD),
+    "gen, gcc": (["mode=gen", "compiler=gcc"], None),
+    "gen, vc14": (["mode=gen", "compiler=vc14"], None),
+}
+FAULTS = [  # call, how, error
+    ("open", "fail", errno.EACCES), ("open", "fail", errno.EMFILE), ("read", "fail", errno.EIO),
+    ("read", "short", 0), ("read", "fail", errno.EINTR), ("write", "fail", errno.ENOSPC), ("write", "short", 0),
+    ("write", "fail", errno.EINTR), ("write", "kill", 0), ("close", "fail", errno.EIO), ("stat", "fail", errno.EIO),
+    ("rename", "fail", errno.EIO), ("rename", "kill", 0), ("unlink", "fail", errno.EIO), ("mkdir", "fail", errno.ENOSPC),
+    ("chmod", "fail", errno.EPERM), ("chmod", "kill", 0), ("utime", "fail", errno.EPERM), ("utime", "kill", 0),
+    ("opendir", "fail", errno.EACCES), ("readdir", "fail", errno.EIO), ("fopen", "fail", errno.EMFILE),
+    ("fwrite", "fail", errno.ENOSPC), ("fwrite", "short", 0), ("fflush", "fail", errno.ENOSPC),
+    ("fclose", "fail", errno.ENOSPC), ("system", "fail", errno.EAGAIN), ("system", "kill", 0),
+]
+INPUTS = ("tree/", "tools/", "all.qrex")
+
+
+class Violation(Exception):
+    """A promise that is not kept."""
+
+
+def outputs(folder):
+    """Path to content of what the runs wrote: identifiers numbered as they come, without what holds times."""
+    contents, identifiers = {}, {}
+    number = lambda match: b"ID%d" % identifiers.setdefault(match.group(0), len(identifiers))
+    for path in sorted(folder.rglob("*")):
+        name = str(path.relative_to(folder))
+        if not path.is_file() or name.startswith(INPUTS) or name.endswith((".rsp", "out1.txt")):
+            continue  # of a tool that is told what to do: the next run makes them anew
+        content = path.read_bytes()
+        if name.endswith((".qrexdep", "projects.guids")):
+            content = b"" if content else b"empty"
+        contents[name] = re.sub(rb"\{?[0-9A-F]{8}-[0-9A-F-]{27}\}?", number, content)
+    return contents
+
+
+def run(binary, folder, arguments, **environment):
+    return subprocess.run([binary, "all.qrex", *arguments], cwd=folder, stdin=subprocess.DEVNULL,
+                          stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=60,
+                          env={**os.environ, **environment})
+
+
+def lines(output):
+    """What was said, without the figures of times."""
+    text = output.decode(errors="replace").replace("\r", "")
+    return {re.sub(r"\.{4,}.*", "", line).strip() for line in text.split("\n")}
+
+
+class Kind:
+    """A kind of run: the workspace ahead of it, and what an undisturbed one leaves and says."""
+
+    def __init__(self, binary, library, folder, name):
+        self.binary, self.name, self.library = binary, name, library
+        self.arguments, earlier = RUNS[name]
+        self.start = folder / name.replace(" ", "_").replace(",", "")
+        workspace = Workspace(binary, files())
+        shutil.move(workspace.folder, self.start)
+        age = time.time() - 100
+        for path in self.start.rglob("*"):
+            os.utime(path, (age, age))
+        if earlier:
+            self.require(run(binary, self.start, earlier))
+            self.before = outputs(self.start)
+            time.sleep(0.02)
+            with open(self.start / "tree/zoo/zoo.h", "a") as header:
+                header.write("int added;\n")
+            with open(self.start / "tree/zoo/big.h", "a") as header:
+                header.write("$struct+ Last { $int32 a; };\n")
+            with open(self.start / "tree/zoo/notes.txt", "a") as notes:
+                notes.write("the end\n")
+        else:
+            self.before = {}
+        end = self.copy(folder / "undisturbed")
+        counts = folder / "counts"
+        done = run(binary, end, self.arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts))
+        self.require(done)
+        self.expected, self.said = outputs(end), lines(done.stdout)
+        self.counts = {call: int(count) for call, count in (line.split() for line in counts.read_text().splitlines())}
+        shutil.rmtree(end)
+
+    @staticmethod
+    def require(done):
+        if done.returncode != 0:
+            raise RuntimeError(done.stdout.decode())
+
+    def copy(self, to):
+        shutil.copytree(self.start, to, symlinks=True)  # with the times
+        return to
+
+    def check(self, folder, done, killed=False):
+        """What must hold behind a run that was disturbed."""
+        if done.returncode < 0 and not (killed and done.returncode == -9):
+            raise Violation(f"ended by signal {-done.returncode}")
+        if done.returncode not in (0, 1) and not killed:
+            raise Violation(f"status {done.returncode}")
+        left = outputs(folder)
+        for name, content in left.items():
+            if not name.startswith(("qrexsource/", "out/include/", "out/source/")) or name.endswith(".part"):
+                continue
+            if content not in (self.expected.get(name), self.before.get(name)):
+                raise Violation(f"{name} is torn")
+        missing = [name for name in self.expected if left.get(name) != self.expected[name]]
+        if missing and not killed and lines(done.stdout) <= self.said:
+            raise Violation(f"missing without a line: {missing}")
+        self.mended(folder)
+
+    def mended(self, folder):
+        done = run(self.binary, folder, self.arguments)
+        if done.returncode != 0:
+            raise Violation("the next run fails: " + done.stdout.decode()[-600:])
+        left = outputs(folder)
+        if left != self.expected:
+            names = sorted(name for name in {**left, **self.expected} if left.get(name) != self.expected.get(name))
+            raise Violation(f"the next run ends with other files: {names}")
+        times = lambda: {path: path.stat().st_mtime_ns for path in folder.rglob("*") if path.is_file()
+                         and not path.name.endswith((".qrexdep", "projects.guids"))}
+        before = times()
+        run(self.binary, folder, self.arguments)
+        noted = [str(path.relative_to(folder)) for path, stamp in times().items() if before.get(path) != stamp]
+        if noted:
+            raise Violation(f"there is something left to do: {noted}")
+
+
+def disturbed(kind, folder, call, at, how, number):
+    """One run with a fault at a call; what it broke, or None."""
+    kind.copy(folder)
+    try:
+        done = run(kind.binary, folder, kind.arguments, LD_PRELOAD=kind.library, FAULT_CALL=call, FAULT_AT=str(at),
+                   FAULT_HOW=how, FAULT_ERRNO=str(number))
+        kind.check(folder, done, how == "kill")
+    except Violation as violation:
+        return f"{call} {at} {how} {errno.errorcode.get(number, '')}: {violation}"
+    except subprocess.TimeoutExpired:
+        return f"{call} {at} {how}: no end"
+    finally:
+        shutil.rmtree(folder, ignore_errors=True)
+    return None
+
+
+def full_disk(kind, folder, kib):
+    """One run on a file system of so many KiB beyond what the workspace takes; then on a roomy one."""
+    folder.mkdir()
+    mount = folder / "disk"
+    mount.mkdir()
+    subprocess.run(["mount", "-t", "tmpfs", "-o", f"size={kib}k", "tmpfs", mount], check=True)
+    try:
+        try:
+            kind.copy(mount / "w")
+        except shutil.Error:
+            return "no room for the workspace"
+        done = run(kind.binary, mount / "w", kind.arguments)
+        shutil.copytree(mount / "w", folder / "w", symlinks=True)
+    finally:
+        subprocess.run(["umount", mount], check=True)
+    try:
+        kind.check(folder / "w", done)
+    except Violation as violation:
+        return f"disk of {kib} KiB: {violation}"
+    finally:
+        shutil.rmtree(folder, ignore_errors=True)
+    return None
+
+
+def can_mount(folder):
+    place = folder / "try"
+    place.mkdir()
+    mounted = subprocess.run(["mount", "-t", "tmpfs", "-o", "size=64k", "tmpfs", place], capture_output=True)
+    return mounted.returncode == 0 and subprocess.run(["umount", place]).returncode == 0
+
+
+def some(count, most):
+    """Numbers from 1 to `count`: all of them, or `most` spread over them with both ends."""
+    if count <= most:
+        return range(1, count + 1)
+    return sorted({1 + round(i * (count - 1) / (most - 1)) for i in range(most)})
+
+
+def rows(kind, folder, short, mounts):
+    """Name of the fault and a function for each run of it."""
+    for call, how, number in FAULTS:
+        points = some(kind.counts.get(call, 0), 3 if short else 10**6)
+        name = f"{call}: {how} {errno.errorcode.get(number, '')}".strip()
+        yield name, [(disturbed, kind, folder / f"{call}{at}", call, at, how, number) for at in points]
+    if mounts:
+        taken = sum(-(-path.stat().st_size // 4096) * 4 + 4 for path in kind.start.rglob("*")) + 8
+        grows = sum(-(-len(content) // 4096) * 4 + 4 for content in kind.expected.values())
+        sizes = some(grows // 4, 3 if short else 60)
+        yield "disk full", [(full_disk, kind, folder / f"disk{size}", taken + 4 * size) for size in sizes]
+
+
+def build_library(folder):
+    library = folder / "inject.so"
+    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, HERE / "inject.c", "-ldl"], check=True)
+    return str(library)
+
+
+def main():
+    parser = argparse.ArgumentParser(description=__doc__.splitlines()[0])
+    parser.add_argument("binary", type=os.path.abspath)
+    parser.add_argument("--short", action="store_true", help="some calls of each kind, within a minute")
+    parser.add_argument("--markdown", action="store_true", help="the table as docs/reliability.md has it")
+    options = parser.parse_args()
+    folder = Path(tempfile.mkdtemp(prefix="qrex-faults-"))
+    kept = broken = 0
+    if options.markdown:
+        print("| Run | Fault | Disturbed runs | Kept their promise |\n|---|---|---|---|")
+    try:
+        library = build_library(folder)
+        mounts = can_mount(folder)
+        if not mounts:
+            print("full disks are left out: mount needs the superuser")
+        with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
+            for name in RUNS:
+                kind = Kind(options.binary, library, folder, name)
+                for fault, calls in rows(kind, folder, options.short, mounts):
+                    if not calls:
+                        continue
+                    found = [text for text in pool.map(lambda call: call[0](*call[1:]), calls) if text]
+                    good = len(calls) - len(found)
+                    kept, broken = kept + good, broken + len(found)
+                    if options.markdown:
+                        print(f"| {name} | {fault} | {len(calls)} | {good} |", flush=True)
+                    elif found or not options.short:
+                        print(f"{name:16} {fault:22} {good:5} of {len(calls)}", flush=True)
+                    for text in found[:20]:
+                        print(f"    {text}", flush=True)
+    finally:
+        shutil.rmtree(folder, ignore_errors=True)
+    print(f"{kept} passed, {broken} failed")
+    return 1 if broken else 0
+
+
+if __name__ == "__main__":
+    sys.exit(main())
