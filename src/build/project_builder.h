@@ -10,7 +10,7 @@
 #include <vector>
 
 #include "text/files.h"
-#include "translator/scanned_file.h"
+#include "translator/symbols/scanned_file.h"
 #include "workspace/workspace.h"
 
 namespace qrex {

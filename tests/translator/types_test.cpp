@@ -1,7 +1,7 @@
 // Types: their codes, their spellings, what they can do, all that may be wrong with them; and their byte code.
 
-#include "translator/byte_code.h"
-#include "translator/emit.h"
+#include "translator/emit/byte_code.h"
+#include "translator/emit/emit.h"
 #include "translator/translate_fixture.h"
 
 namespace qrex {

@@ -1,0 +1,20 @@
+// The text of a class beyond its source: members, operators, record. Each answer about what a class can do is a
+// predicate of ClassDef, so that traits, TypeOps and members agree.
+#pragma once
+
+#include <string>
+
+#include "translator/declared/class_def.h"
+
+namespace qrex {
+
+void WriteClassMembers(TextWriter& out, const ClassDef& def);    // in-class text, at the closing brace
+void WriteClassOperators(TextWriter& out, const ClassDef& def);  // at name-space scope, behind the class
+void WriteEvictDgsNodes(TextWriter& out, const ClassDef& def);
+void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def);  // QueryInterface, GetReflectedClass out of line
+void WriteGetReflected(TextWriter& out, const ClassDef& def);
+void WriteGetTypeOps(TextWriter& out, const ClassDef& def);
+
+bool HasCreateFunction(const ClassDef& def);
+
+}  // namespace qrex

@@ -1,0 +1,19 @@
+// What stands between a class's qualifiers and its body: interfaces, bases, model, mixin list, and the C++ head they
+// make.
+#pragma once
+
+#include <vector>
+
+#include "translator/declared/class_def.h"
+#include "translator/interface/interface_def.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+void ParseIsaList(QrexParser& parser, ClassDef& def);
+// One comma-separated list of bases; those that resolve to a class of this file's view are appended.
+void ParseBaseList(QrexParser& parser, std::vector<ClassDef*>& bases);
+// True when the TypeTraits block has been written here, ahead of the class text.
+bool ParseClassHead(QrexParser& parser, ClassDef& def, bool isFinal);
+
+}  // namespace qrex

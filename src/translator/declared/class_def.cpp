@@ -1,0 +1,171 @@
+#include "translator/declared/class_def.h"
+
+#include <algorithm>
+
+#include "translator/emit/byte_code.h"
+#include "translator/interface/interface_def.h"
+#include "translator/symbols/scanned_file.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr TraitsKind kTraitsKinds[] = {TraitsKind::Struct, TraitsKind::Class, TraitsKind::Adt, TraitsKind::Other,
+                                       TraitsKind::Model};
+
+}  // namespace
+
+ClassDef::ClassDef(ScannedFile& owner, const char* position, ClassKind kind)
+    : NameSpaceElement(owner, position, Category::Class), kind(kind) {
+  traitsKind = kTraitsKinds[static_cast<size_t>(kind)];
+}
+
+std::string_view KeywordOf(ClassKind kind) {
+  static constexpr std::string_view kWords[] = {"struct", "class", "adt", "mixin", "model"};
+  return kWords[static_cast<size_t>(kind)];
+}
+
+bool ClassDef::HaveSomethingToRegister() const {
+  if (m_nested || status != DeclStatus::Defined || IsMixin()) return false;
+  return m_reflected || m_implementsIObject || HasEmbeddedModel() ||
+         (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
+}
+
+// What the record names, in its order: the fields of the mixins stand in it behind the class's own.
+void ClassDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
+  std::vector<const ClassDef*> sources = {this};
+  sources.insert(sources.end(), m_mixins.begin(), m_mixins.end());
+  for (const ClassDef* source : sources) {
+    for (const ClassField& field : source->m_fields) {
+      if (field.reflected) CollectNamedTypes(field.type, *source->owner.rootNameSpace, out);
+    }
+  }
+  for (const ClassDef* source : sources) {
+    for (const ModelField* field : source->m_modelFields) {
+      CollectNamedTypes(field->m_type, *source->owner.rootNameSpace, out);
+    }
+  }
+  for (const FunctionSignature& method : m_methods) CollectNamedTypes(method, *owner.rootNameSpace, out);
+}
+
+bool ClassDef::ContainsMetaData() const {
+  return !metadata.empty() || std::any_of(m_methods.begin(), m_methods.end(), SignatureHasMetadata) ||
+         std::any_of(m_fields.begin(), m_fields.end(), [](const ClassField& f) { return HasMetadata(f.type); }) ||
+         std::any_of(m_modelFields.begin(), m_modelFields.end(),
+                     [](const ModelField* f) { return HasMetadata(f->m_type); });
+}
+
+const std::string& ClassDef::GetTemplateClassName() const {
+  if (m_templateClassName.empty()) m_templateClassName = name + TemplateArgs();
+  return m_templateClassName;
+}
+
+std::string ClassDef::TemplateArgs() const { return IsTemplate() ? "<" + m_templateArgNames + ">" : std::string(); }
+
+std::string ClassDef::TemplatePrefix(std::string_view behind) const {
+  if (!IsMixin() && !IsTemplate()) return {};
+  const char* const base = !IsMixin() ? "" : IsTemplate() ? "typename BC," : "typename BC";
+  return "template <" + (base + m_templateArgList + ">").append(behind);
+}
+
+bool ClassDef::CanBeCreated() const {
+  return qualifiers.abstract != TriState::On && (!IsAdt() || m_implementsIPersistable);
+}
+
+bool ClassDef::HasDefaultCtor() const { return CanBeCreated() && OnOr(qualifiers.dc, m_strict); }
+
+bool ClassDef::HasCopy() const {
+  return qualifiers.abstract != TriState::On && !IsAdt() && OnOr(qualifiers.copy, m_strict);
+}
+
+bool ClassDef::HasEquality() const { return qualifiers.compare == TriState::On || IsPureModel() || m_inheritsModel; }
+
+bool ClassDef::AutoGenerateInsertionToXostream() const {
+  if (qualifiers.abstract == TriState::On) return false;
+  return OnOr(qualifiers.os, !IsMixin() && (m_referencedModel || IsPureModel() || m_inheritsModel));
+}
+
+bool ClassDef::HasPrint() const {
+  return qualifiers.abstract != TriState::On && OnOr(qualifiers.print, AutoGenerateInsertionToXostream());
+}
+
+bool ClassDef::HasSerialise() const {
+  return qualifiers.abstract != TriState::On && OnOr(qualifiers.ser, WriteInsertionExtractionInTermsOfSerialise());
+}
+
+bool ClassDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
+
+// A model may hold containers of its own class: while the answer is worked out, it counts as no. The traits may ask
+// ahead of a body that brings the model.
+bool ClassDef::AnyModelField(bool (*test)(std::string_view, NameSpace&), TriState& cache) const {
+  if (cache == TriState::Unset && HasEmbeddedModel()) {
+    cache = TriState::Off;
+    for (const ModelField* field : m_modelFields) {
+      if (!field->IsDropped() && test(field->m_type, *owner.rootNameSpace)) cache = TriState::On;
+    }
+  }
+  return cache == TriState::On;
+}
+
+bool ClassDef::IsIObjectVisitable() const {
+  return m_hasVisitBlock || AnyModelField(NeedsVisitObjects, m_isIObjectVisitable);
+}
+bool ClassDef::IsPrefVisitable() const { return AnyModelField(NeedsVisitPrefs, m_isPrefVisitable); }
+
+uint32_t ClassDef::TypeOpsBits() const {
+  uint32_t bits = 0;
+  if (HasEquality()) bits |= kOpsEqual | kOpsLess;
+  if (HasPrint()) bits |= kOpsPrint;
+  if (HasSerialise()) bits |= kOpsSerialise;
+  if (HasDefaultCtor()) bits |= kOpsConstruct;
+  if (HasDtor()) bits |= kOpsDestruct;
+  if (HasCopy()) bits |= kOpsCopy;
+  if (IsIObjectVisitable()) bits |= kOpsVisitObjects;
+  if (IsPrefVisitable()) bits |= kOpsVisitPrefs;
+  return bits;
+}
+
+bool ClassDef::GenerateOps() const {
+  return qualifiers.genop == TriState::On ||
+         (m_inheritsModel && m_implementsIObject && qualifiers.genop != TriState::Off);
+}
+
+int64_t ClassDef::GetNumNonDroppedModelFields() const {
+  return std::count_if(m_modelFields.begin(), m_modelFields.end(), [](const ModelField* f) { return !f->IsDropped(); });
+}
+
+bool ClassDef::CanSerialiseEmbeddedModel() const {
+  if (m_numModelSchema <= 0) return false;
+  if (m_canSerialiseModel == Memo::NotComputed) {
+    m_canSerialiseModel = Memo::BeingComputed;
+    const bool can = std::all_of(m_modelFields.begin(), m_modelFields.end(), [this](const ModelField* field) {
+      return field->IsDropped() || IsSerialisable(field->m_type, *owner.rootNameSpace);
+    });
+    m_canSerialiseModel = can ? Memo::Yes : Memo::No;
+  }
+  return m_canSerialiseModel != Memo::No;  // a model that holds itself in a container doesn't stand in its own way
+}
+
+bool ClassDef::WriteInsertionExtractionInTermsOfSerialise() const {
+  if (qualifiers.ar == TriState::On) return true;
+  if (IsMixin()) return false;
+  return CanSerialiseEmbeddedModel() || (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
+}
+
+std::string ClassDef::ModelStructName() const { return IsPureModel() && !m_isAnonymous ? name : name + "_model"; }
+
+std::string ClassDef::QualifiedModelStructName() const {
+  const std::string& qualified = GetQualifiedName();
+  return qualified.substr(0, qualified.size() - name.size()) + ModelStructName();
+}
+
+std::vector<const InterfaceDef*> ClassDef::AllInterfaces() const {
+  std::vector<const InterfaceDef*> all;
+  for (const InterfaceDef* interface : m_interfaces) {
+    for (const InterfaceDef::FlatBase& flat : interface->FlattenedBases()) all.push_back(flat.base);
+    all.push_back(interface);
+  }
+  return all;
+}
+
+}  // namespace qrex

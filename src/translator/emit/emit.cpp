@@ -1,0 +1,93 @@
+#include "translator/emit/emit.h"
+
+#include <algorithm>
+
+#include "translator/symbols/scanned_file.h"
+
+namespace qrex {
+
+Block::Block(TextWriter& out, std::string_view suffix) : m_out(out), m_suffix(suffix) {
+  m_out << "{\n";
+  m_out.Flush();
+  m_out.AddIndent(4);
+}
+
+Block::~Block() {
+  m_out.Flush();
+  m_out.AddIndent(-4);
+  m_out << "}" << m_suffix << "\n";
+}
+
+std::vector<const NameSpace*> EnclosingNameSpaces(const NameSpace* innermost) {
+  std::vector<const NameSpace*> path;
+  for (; innermost && !innermost->IsRoot(); innermost = innermost->parent) path.push_back(innermost);
+  std::reverse(path.begin(), path.end());
+  return path;
+}
+
+NameSpaceFrame::NameSpaceFrame(TextWriter& out, const NameSpace* innermost)
+    : m_out(out), m_path(EnclosingNameSpaces(innermost)) {
+  for (const NameSpace* nameSpace : m_path) m_out << "namespace " << nameSpace->name << "\n{\n";
+}
+
+NameSpaceFrame::~NameSpaceFrame() {
+  for (auto it = m_path.rbegin(); it != m_path.rend(); ++it) m_out << "} // " << (*it)->name << "\n";
+}
+
+std::string ExportPrefix(const NameSpaceElement& element) {
+  const Project& project = *element.owner.file.project;
+  if (!element.m_exported || project.targetType != TargetType::DynamicLinkLibrary) return {};
+  return project.name + "_API ";
+}
+
+std::string TargetIdentifier(const NameSpaceElement& element) { return element.owner.file.project->MangledProjDir(); }
+
+void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments) {
+  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) {
+    PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
+  });
+}
+
+void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, const FunctionSignature& method) {
+  out << className << (method.isConst ? " const" : "") << "* _self";
+  if (!method.arguments.empty()) out << ",";
+  WriteArgDeclarations(out, method.arguments);
+}
+
+void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments) {
+  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { PrintType(out, argument.type); });
+}
+
+void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments) {
+  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { out << argument.name; });
+}
+
+void WriteReturn(TextWriter& out, const TypeCode& returnType) {
+  if (!IsVoid(returnType)) out << "return ";
+}
+
+void WriteSignature(TextWriter& out, const FunctionSignature& signature) {
+  if (signature.isInline) out << "inline ";
+  PrintType(out, signature.returnType);
+  out << " " << signature.name << "(";
+  WriteJoined(out, signature.arguments, ",", [&](const FunctionArg& argument) {
+    PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
+    if (!argument.defaultValue.empty()) out << "=" << argument.defaultValue;
+  });
+  out << (signature.isConst ? ") const" : ")");
+}
+
+std::string NameOrZero(bool present, const std::string& name) { return present ? name : "0"; }
+
+std::string CountedName(size_t count, const std::string& name) {
+  return count == 0 ? "0,0" : name + "," + std::to_string(count);
+}
+
+void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments) {
+  for (size_t dollar; (dollar = text.find('$')) != std::string_view::npos; text.remove_prefix(dollar + 2)) {
+    out << text.substr(0, dollar) << arguments.begin()[text[dollar + 1] - '0'];
+  }
+  out << text;
+}
+
+}  // namespace qrex

@@ -1,0 +1,85 @@
+#include "translator/file/keywords.h"
+
+#include "translator/class/class_members.h"
+#include "translator/class/class_parser.h"
+#include "translator/class/mixin_list.h"
+#include "translator/emit/records.h"
+#include "translator/interface/interface_def.h"
+#include "translator/kinds/enum_def.h"
+#include "translator/kinds/functor_def.h"
+#include "translator/kinds/global_defs.h"
+#include "translator/kinds/variant_def.h"
+#include "translator/model/model.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+namespace {
+
+template <ClassKind kind>
+void ParseFileClass(QrexParser& parser) {
+  ParseClass(parser, kind, nullptr);
+}
+
+template <ClassKind kind>
+void ParseNestedClass(QrexParser& parser, ClassDef& def) {
+  ParseClass(parser, kind, &def);
+}
+
+void ParseModelInBody(QrexParser& parser, ClassDef& def) {
+  if (def.HasEmbeddedModel()) parser.Fail("Repeated model declaration");
+  parser.Advance();
+  ParseModelBlock(parser, def, Expansion::Accessors);
+  parser.DropBehindCurrent();
+}
+
+constexpr Keyword kKeywords[] = {
+    {"enum", [](QrexParser& parser) { ParseEnum(parser, nullptr); }},
+    {"variant", [](QrexParser& parser) { ParseVariant(parser, nullptr); }},
+    {"type", ParseType},
+    {"typedef", ParseTypedef},
+    {"interface", [](QrexParser& parser) { ParseInterface(parser, nullptr); }},
+    {"struct", ParseFileClass<ClassKind::Struct>},
+    {"class", ParseFileClass<ClassKind::Class>},
+    {"adt", ParseFileClass<ClassKind::Adt>},
+    {"mixin", ParseFileClass<ClassKind::Mixin>},
+    {"model", ParseFileClass<ClassKind::Model>},
+    {"var", ParseGlobalVar},
+    {"function", [](QrexParser& parser) { ParseGlobalFunction(parser, false); }},
+    {"polymorphic", [](QrexParser& parser) { ParseGlobalFunction(parser, true); }},
+    {"functor", [](QrexParser& parser) { ParseFunctor(parser, false); }},
+    {"makefunctor", ParseMakeFunctor},
+    {"makeconstfunctor", ParseMakeFunctor},
+    {"new", ParseNew, true},
+    {"warning", ParseWarning},
+    {"init", ParseInit, true},
+    {"uninit", ParseUninit, true},
+};
+
+constexpr ClassKeyword kClassKeywords[] = {
+    {"class", ParseNestedClass<ClassKind::Class>},
+    {"struct", ParseNestedClass<ClassKind::Struct>},
+    {"mixin", ParseNestedClass<ClassKind::Mixin>},
+    {"interface", [](QrexParser& parser, ClassDef& def) { ParseInterface(parser, &def); }},
+    {"enum", [](QrexParser& parser, ClassDef& def) { ParseEnum(parser, &def); }},
+    {"variant", [](QrexParser& parser, ClassDef& def) { ParseVariant(parser, &def); }},
+    {"model", ParseModelInBody},
+    {"cache", ParseCache, true},
+    {"dep", ParseDep},
+    {"indep", ParseIndep},
+    {"evict", ParseEvict, true},
+    {"visit", ParseVisit, true},
+    {"functor", [](QrexParser& parser, ClassDef&) { ParseFunctor(parser, true); }},
+    {"makefunctor", [](QrexParser& parser, ClassDef&) { ParseMakeFunctor(parser); }},
+    {"makeconstfunctor", [](QrexParser& parser, ClassDef&) { ParseMakeFunctor(parser); }},
+    {"implementing", ParseImplementing},
+    {"new", [](QrexParser& parser, ClassDef&) { ParseNew(parser); }, true},
+    {"this", ParseThis, true},
+};
+
+}  // namespace
+
+std::span<const Keyword> FileLevelKeywords() { return kKeywords; }
+std::span<const ClassKeyword> ClassLevelKeywords() { return kClassKeywords; }
+
+}  // namespace qrex

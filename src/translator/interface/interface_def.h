@@ -1,0 +1,58 @@
+// Interfaces: handle structs with a function table, and what classes ask of them.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "translator/declared/class_def.h"
+#include "translator/reader/qrex_parser.h"
+#include "translator/symbols/name_space.h"
+#include "translator/types/type_code.h"
+
+namespace qrex {
+
+struct AttributeDef {
+  std::string name;
+  TypeCode type;
+};
+
+class InterfaceDef : public NameSpaceElement {
+ public:
+  InterfaceDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Interface) {
+    traitsKind = TraitsKind::Interface;
+  }
+
+  std::string_view GetKeyword() const override { return "interface"; }
+  std::string_view GetReflectedKindName() const override { return "Interface"; }
+  bool HaveSomethingToRegister() const override;
+  void WriteReflectedDefinition(TextWriter& out) override;
+  void WriteReflection(TextWriter& out, RegistrationLists& lists) override;
+  DeclStatus GetDeclStatus() const override { return status; }
+  void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
+  bool ContainsMetaData() const override;
+  void WriteExtraTraits(TextWriter& out) const override;
+
+  // Deeper bases first, each once, with the path by which it was first reached ("_B._A").
+  struct FlatBase {
+    const InterfaceDef* base;
+    std::string path;
+  };
+  std::vector<FlatBase> FlattenedBases() const;
+  void AddFlattenedBases(std::vector<FlatBase>& flat, const std::string& path) const;
+  bool InheritsFrom(std::string_view qualifiedName) const;  // is it, or has it among its bases
+  bool SubtypesIObject() const { return InheritsFrom("vesk::IObject"); }
+  size_t InheritedMethodCount() const;  // once per path
+
+  bool m_isIpc = false;
+  bool m_isRmi = false;
+  std::vector<InterfaceDef*> m_bases;
+  size_t m_numTables = 1;  // its own and those of its bases, which its function table embeds once per path
+  std::vector<FunctionSignature> m_methods;  // declared ones, then those made from attributes
+  size_t m_numDeclaredMethods = 0;
+  std::vector<AttributeDef> m_attributes;
+};
+
+void ParseInterface(QrexParser& parser, ClassDef* enclosing);  // `enclosing`: null at file level
+
+}  // namespace qrex

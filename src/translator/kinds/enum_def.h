@@ -1,0 +1,37 @@
+// $enum: a C++ enumeration with a fixed underlying int, or a class over a base of the runtime that wraps one.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <vector>
+
+#include "translator/declared/class_def.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+class EnumDef : public NameSpaceElement {
+ public:
+  EnumDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Enum) {
+    traitsKind = TraitsKind::Enum;
+  }
+  std::string_view GetKeyword() const override { return "enum"; }
+  std::string_view GetReflectedKindName() const override { return "Enum"; }
+  bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined; }
+  void WriteReflectedDefinition(TextWriter& out) override;
+  DeclStatus GetDeclStatus() const override { return status; }
+  void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
+
+  bool HasDisabledLabel() const;
+
+  TriState m_extern{};
+  bool m_isClass = false;
+  std::vector<std::string> m_labels;
+  size_t m_defaultIndex = 0;
+  std::vector<int64_t> m_values;  // empty, or one per label
+  std::vector<bool> m_enabled;    // one per label
+};
+
+void ParseEnum(QrexParser& parser, ClassDef* enclosing);
+
+}  // namespace qrex

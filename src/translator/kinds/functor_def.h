@@ -1,0 +1,30 @@
+// $functor: a callable value of an object pointer and a stub function; $makefunctor and $makeconstfunctor turn a block
+// of code into one.
+#pragma once
+
+#include "translator/reader/qrex_parser.h"
+#include "translator/types/type_code.h"
+
+namespace qrex {
+
+class FunctorDef : public NameSpaceElement {
+ public:
+  FunctorDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Functor) {
+    traitsKind = TraitsKind::Functor;
+    status = DeclStatus::Defined;
+  }
+  std::string_view GetKeyword() const override { return "functor"; }
+  std::string_view GetReflectedKindName() const override { return "Functor"; }
+  bool HaveSomethingToRegister() const override { return true; }
+  void WriteReflectedDefinition(TextWriter& out) override;
+  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
+  void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
+  bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(signature); }
+
+  FunctionSignature signature;
+};
+
+void ParseFunctor(QrexParser& parser, bool nested);
+void ParseMakeFunctor(QrexParser& parser);  // the keyword tells the const form
+
+}  // namespace qrex

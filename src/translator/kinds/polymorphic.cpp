@@ -1,0 +1,93 @@
+#include "translator/kinds/polymorphic.h"
+
+#include "translator/emit/emit.h"
+#include "translator/kinds/variant_def.h"
+#include "translator/symbols/scanned_file.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr size_t kMaxLevels = 100, kMaxLeaves = 100000;
+
+// One level per polymorphic argument; each has a case per item of its variant.
+class Dispatch {
+ public:
+  Dispatch(QrexParser& parser, const GlobalFunctionDef& def)
+      : m_out(parser.out), m_def(def), m_isVoid(IsVoid(def.signature.returnType)) {
+    size_t leaves = 1;
+    for (const FunctionArg& argument : def.signature.arguments) {
+      if (!argument.polymorphic) continue;
+      const VariantDef* variant = VariantOf(argument);
+      if (!variant || variant->m_items.empty()) {
+        parser.Fail("Polymorphic argument " + argument.name + " is not a defined $variant");
+      }
+      m_levels.push_back({&argument, variant, 0});
+      leaves *= variant->m_items.size();
+      if (leaves > kMaxLeaves || m_levels.size() > kMaxLevels)
+        parser.Fail("Too many combinations of polymorphic arguments");
+    }
+  }
+
+  void Write() {
+    Block body(m_out);
+    if (!m_levels.empty()) WriteLevel(0);
+  }
+
+ private:
+  struct Level {
+    const FunctionArg* argument;
+    const VariantDef* variant;
+    size_t item;  // whose case is being written
+  };
+
+  const VariantDef* VariantOf(const FunctionArg& argument) const {
+    NameSpace& root = *m_def.owner.rootNameSpace;
+    uint32_t decorators = 0;
+    std::string_view code = SkipDecorators(argument.type, root, decorators);
+    if (static_cast<uint8_t>(code.front()) == kOpReference) code = SkipDecorators(code.substr(1), root, decorators);
+    if (static_cast<uint8_t>(code.front()) != kOpVariant) return nullptr;
+    return dynamic_cast<const VariantDef*>(NamedElement(code, root));
+  }
+
+  void WriteLevel(size_t depth) {
+    Level& level = m_levels[depth];
+    const bool isLast = depth + 1 == m_levels.size();
+    IndentScope indent(m_out, 4);
+    m_out << "switch(" << level.argument->name << ".GetTag())\n{\n";
+    for (level.item = 0; level.item < level.variant->m_items.size(); ++level.item) {
+      m_out << "case " << level.item << (isLast ? " : " : " :\n");
+      if (isLast) {
+        WriteCall();
+      } else {
+        WriteLevel(depth + 1);
+      }
+    }
+    m_out << "default: vxAssertUnreachable();\n}\n";
+  }
+
+  // Of the overload for the items that the levels stand at.
+  void WriteCall() {
+    m_out << (m_isVoid ? "" : "return ") << m_def.name << "(";
+    auto level = m_levels.begin();
+    for (const FunctionArg& argument : m_def.signature.arguments) {
+      if (&argument != &m_def.signature.arguments.front()) m_out << ",";
+      m_out << argument.name;
+      if (!argument.polymorphic) continue;
+      m_out << ".as<" << level->variant->m_items[level->item]->EffectiveName() << ">()";
+      ++level;
+    }
+    m_out << (m_isVoid ? "); break;\n" : ");\n");
+  }
+
+  TextWriter& m_out;
+  const GlobalFunctionDef& m_def;
+  const bool m_isVoid;
+  std::vector<Level> m_levels;
+};
+
+}  // namespace
+
+void WriteDispatchBody(QrexParser& parser, const GlobalFunctionDef& def) { Dispatch(parser, def).Write(); }
+
+}  // namespace qrex

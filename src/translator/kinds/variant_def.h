@@ -1,0 +1,65 @@
+// $variant: a tagged union of named or anonymous alternatives, with a complete set of value operations.
+#pragma once
+
+#include <memory>
+#include <string>
+#include <vector>
+
+#include "translator/declared/class_def.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+struct VariantItem {
+  bool isStruct = false;  // { ... } name
+  std::vector<ClassField> fields;
+  TypeCode type;
+  std::string name;  // may be empty for a non-struct item
+  bool onHeap = false;
+  size_t tag = 0;
+  std::string typeText;
+  bool isVoid = false;
+
+  bool IsNamed() const { return !name.empty(); }
+  const std::string& EffectiveName() const { return IsNamed() ? name : typeText; }
+  std::string MangledTagName() const;
+};
+
+class VariantDef : public NameSpaceElement, public TypeBehaviour {
+ public:
+  VariantDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Variant) {
+    traitsKind = TraitsKind::Variant;
+  }
+  std::string_view GetKeyword() const override { return "variant"; }
+  std::string_view GetReflectedKindName() const override { return "Variant"; }
+  bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined && m_reflected; }
+  void WriteReflectedDefinition(TextWriter& out) override;
+  DeclStatus GetDeclStatus() const override { return status; }
+  void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
+  bool ContainsMetaData() const override;
+
+  bool HasSerialise() const;           // of its own
+  bool CanSerialise() const override;  // as a type of items and fields
+  bool IsIObjectVisitable() const override;
+  bool IsPrefVisitable() const override;
+  bool ItemVisits(const VariantItem& item, bool (*test)(std::string_view, NameSpace&)) const;
+  bool AllVoid() const;
+  bool WritesToStream() const { return qualifiers.os != TriState::Off; }
+  uint32_t TypeOpsBits() const;
+
+  bool m_hasDefault = false;
+  ClassQualifiers qualifiers;
+  std::vector<std::unique_ptr<VariantItem>> m_items;
+
+ private:
+  enum class Memo { NotComputed, BeingComputed, No, Yes };
+  mutable Memo m_hasSerialise = Memo::NotComputed;
+  mutable Memo m_visitsObjects = Memo::NotComputed, m_visitsPrefs = Memo::NotComputed;
+  bool AnyItemVisits(Memo& memo, bool (*test)(std::string_view, NameSpace&)) const;
+};
+
+void ParseVariant(QrexParser& parser, ClassDef* enclosing);
+void WriteVariantBody(TextWriter& out, const VariantDef& def);  // of the class
+void WriteVariantTail(TextWriter& out, const VariantDef& def);  // behind it
+
+}  // namespace qrex

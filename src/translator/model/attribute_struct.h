@@ -1,0 +1,64 @@
+// Attribute structs: one unnamed struct per field in a union, whose operators make the field look like a data member
+// while every use goes through accessors. They serve the fields of model mixins and the attributes of interface handles
+// alike.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "text/text_writer.h"
+#include "translator/declared/class_def.h"
+#include "translator/model/field_path.h"
+
+namespace qrex {
+
+// --- What accessors and attribute structs ask of a type; `code` is behind metadata, typedefs and decorators.
+inline bool IsVectorLike(uint8_t op) { return op == kOpVector || op == kOpString8 || op == kOpString16; }
+std::string_view VectorElement(std::string_view code);                // of a vector or a string
+const ClassDef* ModelOfType(std::string_view code, NameSpace& root);  // a class of kind model; or null
+
+class AttributeWriter {
+ public:
+  // `byValue`: the accessors behind the struct answer by value; `hasWrite`: they include Write.
+  AttributeWriter(TextWriter& out, NameSpace& root, bool byValue, bool hasWrite)
+      : m_out(out), m_root(root), m_byValue(byValue), m_hasWrite(hasWrite) {}
+
+  void WriteStruct(const std::string& className, std::string_view type, const std::string& attributeName,
+                   const std::string& accessorName, const std::string& memberName, bool readOnly);
+
+ private:
+  // What the operators of one attribute or proxy refer to.
+  struct Scope {
+    std::string className;
+    size_t depth = 0;
+    std::string self, constSelf;
+    std::string attribute;
+    std::string accessor;
+    std::string member;
+    bool inProxy = false;
+    bool readOnly = false;
+    std::string Key() const { return inProxy ? ParameterName(depth - 1) : std::string(); }
+  };
+
+  void WriteOperators(Scope scope, std::string_view type);
+  void WriteConversions(const Scope& scope, std::string_view typeText, bool isOffsettable);
+  void WriteModel(const Scope& scope, const ClassDef& model);
+  void WriteOffset(const Scope& scope, std::string_view type, uint8_t op);
+  void WritePlain(const Scope& scope, std::string_view type, std::string_view code);
+  void WriteVector(const Scope& scope, std::string_view element);
+  void WriteKeySet(const Scope& scope, std::string_view key);
+  void WriteProxy(const Scope& scope, PathElement element, const std::string& keyType, std::string_view elementType);
+
+  void WriteForwarders(size_t first, size_t last, std::string_view type, const std::string& name, bool readOnly);
+  void WriteContainerForwarders(size_t first, size_t last, PathElement element, std::string_view elementType,
+                                const std::string& name, bool readOnly);
+  std::string ForwardedParameters(size_t first, size_t last) const { return m_path.Parameters(first + 1, last + 1); }
+
+  TextWriter& m_out;
+  NameSpace& m_root;
+  FieldPath m_path;  // indexes and keys only
+  const bool m_byValue;
+  const bool m_hasWrite;
+};
+
+}  // namespace qrex

@@ -1,0 +1,44 @@
+// Models: the block of data fields with its schema, and the text that it becomes.
+#pragma once
+
+#include "translator/declared/class_def.h"
+#include "translator/emit/byte_code.h"
+#include "translator/model/type_expansion.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+// On the `{` or the `<<` of the block; leaves it on the closing `}`. Constructor text is written while it is read.
+// `expansion`: what will be generated of the fields.
+void ParseModelBlock(QrexParser& parser, ClassDef& def, Expansion expansion);
+
+// The whole of a model struct: heading, block (read here), members, "};\n". On the `{` or `<<`; leaves it on the `}`.
+void ParseModelStruct(QrexParser& parser, ClassDef& def);
+
+enum class TextPlace { Inline, OutOfLine };
+void WriteModelFieldsAndAccessors(TextWriter& out, const ClassDef& def);  // of a model in a class body
+void WriteSerialise(TextWriter& out, const ClassDef& def, TextPlace place);
+void WriteDeserialise(TextWriter& out, const ClassDef& def, TextPlace place);
+void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place);
+void WriteVisitingDeclarations(TextWriter& out, const ClassDef& def);
+void WriteModelMixin(TextWriter& out, const ClassDef& def);
+
+// At class level, in the reflection tail: what must be declared ahead of the class's definitions, and the two functions
+// that keep the data source's release number.
+void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def);
+void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def);
+
+void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def);  // when `os` is unset
+// Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or an empty view.
+std::string_view MapOrSetIn(std::string_view code);
+inline bool HoldsMapOrSet(std::string_view code) { return !MapOrSetIn(code).empty(); }
+// The rows of `_modelFields`; returns their number.
+size_t WriteModelFieldRows(TextWriter& out, const ClassDef& def);
+// The fields that those rows describe: the class's own, then those of its mixins.
+struct MixedModelField {
+  const ModelField* field;
+  bool fromMixin;
+};
+std::vector<MixedModelField> AllModelFields(const ClassDef& def);
+
+}  // namespace qrex

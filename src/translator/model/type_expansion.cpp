@@ -1,0 +1,78 @@
+#include "translator/model/type_expansion.h"
+
+#include <algorithm>
+
+namespace qrex {
+
+namespace {
+
+class TypeExpansion {
+ public:
+  TypeExpansion(NameSpace& root, Expansion expansion) : m_root(root), m_expansion(expansion) {}
+
+  void Enter(const ClassDef* def) { m_path.push_back(def); }
+
+  // `intoAnyClass`: the model of any class is followed, not only that of a class of kind model.
+  std::string Fault(std::string_view type, size_t depth, bool intoAnyClass) {
+    uint32_t decorators = 0;
+    type = SkipDecorators(type, m_root, decorators);
+    if (depth > kMaxDepth || ++m_steps > kMaxSteps) return "type nested too deeply";
+    const bool isMethods = m_expansion == Expansion::Methods;
+    const uint32_t ending = isMethods ? ~uint32_t{kHasConst} : uint32_t{kHasAssignable};
+    if (decorators & ending) return {};
+    std::string_view element;
+    switch (static_cast<uint8_t>(type.front())) {
+      case kOpClass:
+        return ClassFault(type, depth, intoAnyClass);
+      case kOpVector:
+        return isMethods ? Fault(type.substr(1), depth + 1, true) : "";
+      case kOpDynArray:
+        element = type.substr(1);
+        break;
+      case kOpArray:
+        element = ArrayElement(type);
+        break;
+      case kOpMap:
+        element = MapValue(type);
+        break;
+      default:
+        return {};
+    }
+    return isMethods ? "" : Fault(element, depth + 1, m_expansion == Expansion::AttributeStructs);
+  }
+
+ private:
+  // The text grows with the square of the depth, and with the number of fields reached.
+  static constexpr size_t kMaxDepth = 50;
+  static constexpr size_t kMaxSteps = 100000;
+
+  std::string ClassFault(std::string_view type, size_t depth, bool intoAnyClass) {
+    const NameSpaceElement* element = NamedElement(type, m_root);
+    if (!element || element->category != Category::Class) return {};
+    const auto* def = static_cast<const ClassDef*>(element);
+    if (!intoAnyClass && !def->IsPureModel()) return {};
+    if (std::find(m_path.begin(), m_path.end(), def) != m_path.end()) return PrintedElement(*def) + " contains itself";
+    Enter(def);
+    for (const ModelField* field : def->m_modelFields) {
+      if (field->IsDropped()) continue;
+      if (std::string fault = Fault(field->m_type, depth + 1, intoAnyClass); !fault.empty()) return fault;
+    }
+    m_path.pop_back();
+    return {};
+  }
+
+  NameSpace& m_root;
+  const Expansion m_expansion;
+  std::vector<const ClassDef*> m_path;
+  size_t m_steps = 0;
+};
+
+}  // namespace
+
+std::string ExpansionFault(std::string_view type, NameSpace& root, Expansion expansion, const ClassDef* self) {
+  TypeExpansion way(root, expansion);
+  if (self) way.Enter(self);
+  return way.Fault(type, 0, expansion == Expansion::Methods);
+}
+
+}  // namespace qrex

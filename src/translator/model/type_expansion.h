@@ -1,0 +1,23 @@
+// How far generated text follows a type: into the fields of models, and on into the elements of containers. The text
+// that comes of it is finite only where the way never leads back to a model that it passed.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+#include "translator/declared/class_def.h"
+
+namespace qrex {
+
+// What is generated. A field that is decorated as assignable is got and set whole and ends each way.
+enum class Expansion {
+  Accessors,         // of a model's fields: through arrays and maps, into classes of kind model
+  AttributeStructs,  // as Accessors; below an array or map its forwarders go into the model of any class
+  Methods            // of an interface's attributes: through vectors, into the model of any class
+};
+
+// Why a type can't be expanded ("$model Node contains itself"); empty when it can. `self`: the class whose model is
+// just being read or expanded, or null.
+std::string ExpansionFault(std::string_view type, NameSpace& root, Expansion expansion, const ClassDef* self);
+
+}  // namespace qrex

@@ -1,0 +1,339 @@
+#include "translator/reader/qrex_parser.h"
+
+#include <algorithm>
+#include <cstring>
+
+#include "lex/literals.h"
+#include "lex/sections.h"
+#include "text/paths.h"
+#include "translator/emit/records.h"
+#include "translator/file/keywords.h"
+#include "translator/file/predefined_variables.h"
+#include "translator/types/type_code.h"
+
+namespace qrex {
+
+QrexParserOutputStream::QrexParserOutputStream(IOutputStream& target, std::vector<const char*>& lineTable,
+                                               TextRange expanded, const SourceMap& map)
+    : m_target(target), m_lineTable(lineTable), m_expanded(expanded), m_map(map), m_cursor(map) {}
+
+void QrexParserOutputStream::Write(const void* data, size_t length) {
+  const std::string_view text(static_cast<const char*>(data), length);
+  m_lineTable.insert(m_lineTable.end(), static_cast<size_t>(std::count(text.begin(), text.end(), '\n')),
+                     SourcePosition());
+  m_target.Write(data, length);
+}
+
+void QrexParserOutputStream::Flush() { m_target.Flush(); }
+
+void QrexParserOutputStream::CopyRange(const char* begin, const char* end) {
+  m_target.Write(begin, static_cast<size_t>(end - begin));
+  while (const void* newline = std::memchr(begin, '\n', static_cast<size_t>(end - begin))) {
+    m_copied = static_cast<const char*>(newline);
+    m_lineTable.push_back(SourcePosition());
+    begin = m_copied + 1;
+  }
+  m_copied = end;
+}
+
+const char* QrexParserOutputStream::SourcePosition() {
+  if (!m_copied || m_expanded.Empty()) return nullptr;
+  const char* last = m_expanded.end - 1;
+  return m_cursor.Map((m_copied < last ? m_copied : last) - m_expanded.begin);
+}
+
+const char* QrexParserOutputStream::SourcePosition(const char* expanded) const {
+  if (m_expanded.Empty()) return nullptr;
+  const char* last = m_expanded.end - 1;
+  return MapOutputOffset(m_map, (expanded < last ? expanded : last) - m_expanded.begin);
+}
+
+QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded)
+    : file(file),
+      stream(stream),
+      out(out),
+      expanded(expanded),
+      m_copyPosition(expanded.begin),
+      m_nameSpaces{file.rootNameSpace.get()} {
+  m_warnings.fill(true);
+  SetInput(expanded);
+}
+
+void QrexParser::CopyTo(const char* position) {
+  out.Flush();
+  if (position < m_copyPosition) return;  // dealt with before
+  stream.CopyRange(m_copyPosition, position);
+  m_copyPosition = position;
+}
+
+// Plain text is not copied token by token: it goes out in one run when something other is met.
+void QrexParser::Translate() {
+  const FileKind kind = file.file.kind;
+  const bool checksIncludes = kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H;
+  const auto isActedOn = [checksIncludes](const LexToken& token) {
+    switch (token.kind) {
+      case kIdentifier:
+        return (*token.text.begin == 'u' && token.Is("using")) || (*token.text.begin == 'n' && token.Is("namespace"));
+      case kHash:
+        return checksIncludes;
+      case kAt:
+      case kOpenBrace:
+      case kCloseBrace:
+      case kDollar:
+      case kEndOfText:
+        return true;
+      default:
+        return false;
+    }
+  };
+  while (current.kind != kEndOfText) {
+    if (checksIncludes && Is(kHash)) {
+      CheckInclude();
+      continue;
+    }
+    if (Is(kAt) && TranslateAt()) continue;
+    if (Is(kIdentifier) && Is("using")) {
+      Advance();
+      AcceptWord("namespace");
+    } else if (Is(kIdentifier) && Is("namespace")) {
+      OpenNameSpace();
+    } else if (Is(kOpenBrace)) {
+      ++m_braceDepth;
+      Advance();
+    } else if (Is(kCloseBrace)) {
+      CloseBrace();
+    } else if (Is(kDollar)) {
+      CopyToCurrent();
+      Advance();
+      Dispatch();
+    } else {
+      AdvanceUntil(isActedOn);
+    }
+  }
+  CopyTo(expanded.end);
+  if (!m_savedWarnings.empty()) ReportWarning(1015, "$warning(push) without matching pop");
+}
+
+void QrexParser::CheckInclude() {
+  Advance();
+  if (!AcceptWord("include") || !Is(kDoubleQuoted)) return;
+  std::string path;
+  DecodeString(current, path);
+  const ProjectFile* included = file.ResolveImport(path);
+  if (included && included->project->usesQrex) Fail("#include should be replaced by @import");
+}
+
+// False for a word other than `import`, which is then the current token.
+bool QrexParser::TranslateAt() {
+  CopyToCurrent();
+  Advance();
+  if (!AcceptWord("import")) return false;
+  DropToCurrent();
+  out << "#include ";
+  if (!Is(kDoubleQuoted)) FailExpected("quoted string");
+  std::string path;
+  DecodeString(current, path);
+  ProjectFile* target = file.ResolveImport(path);
+  if (!target) Fail("Can't import file: " + path);
+  const ScannedFile& imported = file.host.GetScannedFile(*target);
+  file.mounted.Add(imported.index);
+  file.mounted.Add(imported.mounted);
+  Advance();
+  return true;
+}
+
+void QrexParser::OpenNameSpace() {
+  CheckNesting(m_savedDepths.size());
+  Advance();
+  const char* const position = current.text.begin;
+  std::string name;
+  if (Is(kIdentifier)) {
+    name = ReadIdentifier();
+  } else if (!Is(kOpenBrace)) {
+    FailExpected("identifier");
+  }
+  NameSpace* opened = Current().FindOrCreateNameSpace(name);
+  if (!opened) {
+    Fail("Can't open namespace " + name + " : " + PrintedElement(*Current().LookupLocal(name)) + " is not a namespace");
+  }
+  if (!opened->position) opened->position = stream.SourcePosition(position);
+  Expect(kOpenBrace, "{");
+  m_nameSpaces.push_back(opened);
+  m_savedDepths.push_back(m_braceDepth);
+  m_braceDepth = 1;
+}
+
+void QrexParser::CloseBrace() {
+  if (m_braceDepth < 1) Fail("Can't match }");
+  Advance();
+  if (--m_braceDepth == 0 && !m_savedDepths.empty()) {
+    m_braceDepth = m_savedDepths.back();
+    m_savedDepths.pop_back();
+    m_nameSpaces.pop_back();
+  }
+}
+
+void QrexParser::Dispatch() {
+  for (const Keyword& keyword : FileLevelKeywords()) {
+    if (!Is(keyword.word)) continue;
+    keyword.parse(*this);
+    if (!keyword.advancesItself) Advance();
+    return;
+  }
+  Fail("'$" + Printed(current) + "' is not a valid directive");
+}
+
+bool QrexParser::Accept(int32_t kind) {
+  if (!Is(kind)) return false;
+  Advance();
+  return true;
+}
+
+bool QrexParser::AcceptWord(std::string_view word) {
+  if (!Is(kIdentifier) || !Is(word)) return false;
+  Advance();
+  return true;
+}
+
+std::string QrexParser::RequireIdentifier(std::string_view what) {
+  if (!Is(kIdentifier)) FailExpected(what);
+  return ReadIdentifier();
+}
+
+void QrexParser::Fail(std::string message) const { throw LexScannerException(std::move(message), current); }
+
+void QrexParser::CheckNesting(size_t levels) const {
+  constexpr size_t kMaxNesting = 1000;
+  if (levels >= kMaxNesting) Fail("Declarations nested too deeply");
+}
+
+void QrexParser::SkipToMatching(int32_t open, int32_t close, std::string_view atEnd) {
+  for (int64_t depth = 0;; Advance()) {
+    if (Is(kEndOfText)) Fail(std::string(atEnd));
+    if (Is(open)) ++depth;
+    if (Is(close) && --depth == 0) return;
+  }
+}
+
+void QrexParser::SplitShiftRight() {
+  if (!Is(kShiftRight)) return;
+  current.kind = kGreater;
+  current.text.end = current.text.begin + 1;
+  scanner.begin = current.text.end;
+}
+
+void QrexParser::SkipAngles(std::string_view atEnd) {
+  for (int64_t depth = 0;; Advance()) {
+    if (Is(kEndOfText)) Fail(std::string(atEnd));
+    SplitShiftRight();
+    if (Is(kLess)) ++depth;
+    if (Is(kGreater) && --depth == 0) return;
+  }
+}
+
+// --- $new, $init, $uninit
+
+void SkipNewExpression(QrexParser& parser) {
+  parser.Advance();
+  do {
+    parser.RequireIdentifier();
+    while (parser.Is(kOpenParen) || parser.Is(kLess)) {
+      if (parser.Is(kLess)) {
+        parser.SkipAngles();
+      } else {
+        parser.SkipToMatching(kOpenParen, kCloseParen, "Reached end of stream while scanning for matching )");
+      }
+      parser.Advance();
+    }
+  } while (parser.Accept(kColonColon));
+}
+
+void ParseNew(QrexParser& parser) {
+  parser.DropBehindCurrent();
+  parser.out << kDollarNew;
+  SkipNewExpression(parser);
+  parser.CopyToCurrent();
+  parser.out << ")";
+  parser.Flush();
+}
+
+namespace {
+
+void ParseInitBlock(QrexParser& parser, std::string_view keyword, std::vector<std::string>& names) {
+  parser.Advance();
+  parser.DropToCurrent();
+  if (!parser.Is(kOpenBrace)) parser.FailExpected("{");
+  const std::string name = parser.file.file.stem + std::to_string(names.size());
+  std::string qualified;
+  for (NameSpace* scope = &parser.Current(); !scope->IsRoot(); scope = scope->parent) {
+    qualified = scope->name + "::" + qualified;
+  }
+  names.push_back(qualified + name);
+  parser.out << "void _" << keyword << "_" << name << "()\n";
+  parser.Flush();
+}
+
+}  // namespace
+
+void ParseInit(QrexParser& parser) { ParseInitBlock(parser, "Register", parser.file.registerNames); }
+void ParseUninit(QrexParser& parser) { ParseInitBlock(parser, "Unregister", parser.file.unregisterNames); }
+
+// --- One file
+
+namespace {
+
+std::string IncludeGuard(std::string_view path) {
+  std::string guard = "_";
+  for (char c : path) {
+    const bool isPlain = (c >= '0' && c <= '9') || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
+    guard += isPlain ? c : '_';
+  }
+  return guard;
+}
+
+void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded) {
+  const FileKind kind = file.file.kind;
+  constexpr size_t kUsualLine = 32;
+  file.lineTable.reserve(expanded.Size() / kUsualLine);
+  QrexParserOutputStream stream(target, file.lineTable, expanded, file.expansionMap);
+  TextWriter out(stream);
+  if (kind == FileKind::H) {
+    const std::string guard = IncludeGuard(file.file.path);
+    TextWriter head(target);  // not counted in the line table, which begins with the text proper
+    head << "#pragma once\n#ifndef " << guard << "\n#define " << guard << "\n\n";
+    head.Flush();
+  }
+  QrexParser(file, stream, out, expanded).Translate();
+  out.Flush();
+  if (const char* last = stream.SourcePosition()) file.lineTable.push_back(last);
+
+  file.hasDeclarations = file.rootNameSpace->HaveSomethingToRegister();
+  if (kind == FileKind::Cpp) WriteReflectionTails(file, out);
+  if (file.file.isMainSource) {
+    WriteProjectRegistration(file, file.host.RegisterMap(), out);
+    WriteProjectRegistration(file, file.host.UnregisterMap(), out);
+  }
+  if (kind == FileKind::H) out << "\n#endif // include guard\n";
+  out.Flush();
+}
+
+}  // namespace
+
+void TranslateFile(ScannedFile& file, IOutputStream& target) {
+  DefinePredefinedVariables(file);
+  file.lineTable.clear();
+  TextRange expanded;
+  try {
+    expanded = ExpandWithMap(&file, file.frame, TextRange(std::string_view(file.sourceText)), 0, 0, file.expandedText,
+                             file.expansionMap);
+    TranslateText(file, target, expanded);
+  } catch (LexScannerException& exception) {
+    MapErrorPosition(file.expansionMap, expanded, exception);
+    if (exception.file.empty() && exception.position) {
+      file.host.FindSourcePosition(exception.position, exception.file, exception.line);
+    }
+    throw;
+  }
+}
+
+}  // namespace qrex

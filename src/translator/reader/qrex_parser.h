@@ -1,0 +1,194 @@
+// The translator proper: scans the expanded text of one file, copies plain C++ through, and sends each `$` keyword to
+// its handler. Handlers are free functions `void ParseX(QrexParser&)`, one pair of files per declared kind, in the
+// table of qrex_parser.cpp; this class is what they share: tokens, copying, names, types, warnings.
+//
+// A handler is called with its keyword as the current token and leaves the current token on the last one of its
+// declaration (the main loop reads on from there). It drops source text by moving the copy position forward without
+// copying.
+#pragma once
+
+#include <array>
+#include <cstdint>
+#include <functional>
+#include <memory>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "macro/expression_parser.h"
+#include "macro/source_map.h"
+#include "text/streams.h"
+#include "translator/symbols/name_space.h"
+#include "translator/symbols/scanned_file.h"
+#include "translator/types/type_code.h"
+
+namespace qrex {
+
+class ClassDef;
+
+// Receives the generated text, and keeps for each generated line the source position that it came from: that of the
+// last source text copied, so that a compiler's error in generated text points at the declaration which produced it.
+class QrexParserOutputStream : public IOutputStream {
+ public:
+  QrexParserOutputStream(IOutputStream& target, std::vector<const char*>& lineTable, TextRange expanded,
+                         const SourceMap& map);
+  void Write(const void* data, size_t length) override;  // generated text
+  void Flush() override;
+  void CopyRange(const char* begin, const char* end);  // source text, bypassing the indentation
+  const char* SourcePosition();                        // mapped position of the last source text copied; null if none
+  const char* SourcePosition(const char* expanded) const;  // mapped position of an address in the expanded text
+
+ private:
+  IOutputStream& m_target;
+  std::vector<const char*>& m_lineTable;
+  TextRange m_expanded;
+  const SourceMap& m_map;
+  MapCursor m_cursor;
+  const char* m_copied = nullptr;
+};
+
+class QrexParser : public ExpressionParser {
+ public:
+  QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded);
+
+  void Translate();  // the main loop over the whole text
+
+  // --- Copying. The copy position is how far the expanded text has been dealt with, copied or dropped.
+  void CopyTo(const char* position);
+  void CopyToCurrent() { CopyTo(current.text.begin); }
+  void DropTo(const char* position) { m_copyPosition = position; }
+  void DropToCurrent() { DropTo(current.text.begin); }
+  void DropBehindCurrent() { DropTo(current.text.end); }
+  void Flush() { out.Flush(); }
+
+  // --- Tokens beyond ParserBase.
+  bool Is(std::string_view word) const { return current.text == word; }
+  bool Is(int32_t kind) const { return current.kind == kind; }
+  bool Accept(int32_t kind);  // advances and answers true when the current token is of that kind
+  bool AcceptWord(std::string_view word);
+  std::string RequireIdentifier(std::string_view what = "identifier");  // advances
+  [[noreturn]] void Fail(std::string message) const;                    // at the current token
+  void CheckNesting(size_t levels) const;  // fails where declarations or name spaces are as deep as may be
+  // From an opening bracket to its matching closing one, which becomes the current token. Failure: `atEnd`.
+  void SkipToMatching(int32_t open, int32_t close, std::string_view atEnd);
+  // The same for < >, where `>>` closes two levels.
+  void SkipAngles(std::string_view atEnd = "Reached end of stream while scanning for matching >");
+  void SplitShiftRight();  // a current `>>` becomes its first half; the second is the next token
+
+  // --- Names.
+  NameSpaceElement* FindName(std::string_view name);  // the current name space, then the root
+  NameSpaceElement& ParseQualifiedId();
+  void ParseExportModifier(NameSpaceElement& element);
+  bool ParseExportModifier();                       // the bare `+`
+  void ParseQualifiers(NameSpaceElement& element);  // << >> of functions, functors and interfaces; `<<` is current
+  // As above for given flags; `onWhat` ends the failure text (" >> on $type"). `acceptOther` is asked about words that
+  // are neither `reflect` nor `register`; false: the word is not known.
+  void ParseQualifierFlags(bool& reflected, bool& registered, std::string_view onWhat,
+                           const std::function<bool(bool on)>& acceptOther = nullptr);
+  [[noreturn]] void FailConflict(std::string_view keyword, std::string_view name, const NameSpaceElement& old);
+  [[noreturn]] void FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element);
+  // Into the current name space, or into the class that encloses it.
+  void Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* enclosing);
+  // A forward declaration stands in the current name space, also from a class body, unless a thing of its name does
+  // already. `old` is what the look-up of one that is not nested found.
+  void EnterForward(std::unique_ptr<NameSpaceElement> element, const NameSpaceElement* old, const ClassDef* enclosing);
+  void RequireSemicolonAfter(const NameSpaceElement& element);  // "; expected after definition of ..."
+  void SeeDeclaration(const NameSpaceElement& element);
+  void RequireIObjectImport();  // "@import of IObject.h required"
+
+  // --- Types (type_parser.cpp). `reflected`: the type must be understood completely.
+  bool ParseTypeWithName(TypeCode& type, std::string* name, bool nameRequired, bool* followedByParen, bool reflected);
+  bool ParseBaseType(TypeCode& type, bool reflected);
+  void ParseFunctionSignature(FunctionSignature& signature, bool constAllowed, bool directionsRequired,
+                              bool polymorphicAllowed, bool reflected);
+  void ParseMethodOrAttribute(bool constAllowed, bool& isAttribute, FunctionSignature& signature, bool ipc,
+                              bool reflected);
+  void ParseFunctionArg(FunctionArg& arg, bool directionsRequired, bool reflected);
+  std::string ReadArgumentText();            // behind the current token, to the top-level `,` or `)` that ends it
+  void ParseMetadataList(std::string& out);  // `[` is current; behind `]` afterwards
+  void ParseMetadataValue(std::string& out);
+  void ParseOptionalMetadata(std::string& out);  // tests for `[`
+
+  // --- Warnings: 18 codes, 1000 + index, that $warning switches on and off.
+  bool WarningOn(int code) const { return m_warnings[static_cast<size_t>(code - 1000)]; }
+  // Position: `address` in the expanded text, else the element's, else where the scanner reads.
+  void ReportWarning(int code, std::string_view text, const NameSpaceElement* element = nullptr,
+                     const char* address = nullptr);
+  void CheckPublicHeader(const NameSpaceElement& element);       // both of the following
+  void CheckNotExported(const NameSpaceElement& element);        // W1009
+  void CheckNotInPublicHeader(const NameSpaceElement& element);  // W1008
+  void CheckReferences(const NameSpaceElement& element);         // W1002
+  void CheckMetadata(const NameSpaceElement& element);           // W1001: non-reflected with metadata
+  void CheckRedundant(const NameSpaceElement& element);          // W1004: non-reflected with a list that needs it
+
+  const char* SourcePosition() {
+    out.Flush();
+    return stream.SourcePosition();
+  }  // where the next declaration stands
+  NameSpace& Current() { return *m_nameSpaces.back(); }
+  NameSpace& Root() { return *m_nameSpaces.front(); }
+  bool AtFileScope() const { return m_nameSpaces.size() == 1; }
+  const Project& GetProject() const { return *file.file.project; }
+
+  const char* lastNameEnd = nullptr;  // behind the name that ParseTypeWithName read last
+  size_t lastSuffixSize = 0;          // of the part of its code that stands for the arrays behind the name
+  int nesting = 0;                    // of declarations inside declarations, see NestingGuard
+  ScannedFile& file;
+  QrexParserOutputStream& stream;
+  TextWriter& out;
+  const TextRange expanded;
+
+ private:
+  friend void ParseWarning(QrexParser& parser);
+  using WarningFlags = std::array<bool, 18>;
+
+  void CheckInclude();
+  bool TranslateAt();
+  void OpenNameSpace();
+  void CloseBrace();
+  void Dispatch();
+  bool ParseDecoratorType(TypeCode& type, bool reflected);
+  bool ParseSuffixedType(TypeCode& type, bool reflected);
+  void ParseInnerType(TypeCode& type, bool reflected);
+  void CheckPlatformDependent() const;
+  TypeCode ParseArraySuffix();
+  void ParseArguments(FunctionSignature& signature, bool directionsRequired, bool polymorphicAllowed, bool reflected);
+  void ParseSignatureEnd(FunctionSignature& signature, bool constAllowed);
+  size_t ParseMetadataValues(std::string& out, int32_t close, std::string_view expected, std::string_view exceeded);
+
+  const char* m_copyPosition;
+  std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
+  std::vector<int64_t> m_savedDepths;
+  int64_t m_braceDepth = 0;
+  WarningFlags m_warnings;
+  std::vector<WarningFlags> m_savedWarnings;
+};
+
+// Bounds the recursion of handlers that call each other for nested declarations, types or lists.
+class NestingGuard {
+ public:
+  explicit NestingGuard(QrexParser& parser) : m_parser(parser) {
+    parser.CheckNesting(static_cast<size_t>(parser.nesting));
+    ++parser.nesting;
+  }
+  ~NestingGuard() { --m_parser.nesting; }
+  NestingGuard(const NestingGuard&) = delete;
+  NestingGuard& operator=(const NestingGuard&) = delete;
+
+ private:
+  QrexParser& m_parser;
+};
+
+// Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`.
+void TranslateFile(ScannedFile& file, IOutputStream& target);
+
+// Handlers that other kinds call inside their bodies.
+void ParseNew(QrexParser& parser);
+void SkipNewExpression(QrexParser& parser);  // from `new` to behind the expression
+inline constexpr std::string_view kDollarNew = "vesk::DollarNew(new";
+inline constexpr std::string_view kDollarThis = "this->GetThisAsFinalClass()";
+void ParseInit(QrexParser& parser);
+void ParseUninit(QrexParser& parser);
+void ParseWarning(QrexParser& parser);
+
+}  // namespace qrex

@@ -1,0 +1,164 @@
+#include "translator/symbols/name_space.h"
+
+#include <algorithm>
+
+#include "lex/token.h"
+#include "translator/symbols/scanned_file.h"
+
+namespace qrex {
+
+const std::string& NameSpaceElement::GetQualifiedName() const {
+  if (m_qualifiedName.empty()) {
+    m_qualifiedName = parent && !parent->name.empty() ? parent->GetQualifiedName() + "::" + name : name;
+  }
+  return m_qualifiedName;
+}
+
+void PrintElement(TextWriter& out, const NameSpaceElement& element) {
+  out << "$" << element.GetKeyword() << (element.m_exported ? "+ " : " ") << element.GetQualifiedName();
+}
+
+std::string PrintedElement(const NameSpaceElement& element) {
+  MemoryTextWriter text;
+  PrintElement(text, element);
+  return text.TakeText();
+}
+
+// --- Symbols
+
+void Symbol::Enter(NameSpaceElement& element) {
+  if (m_newest) (m_newest->GetDeclStatus() == DeclStatus::Forward ? m_forward : m_declared).push_back(m_newest);
+  m_newest = &element;
+  m_categories |= 1u << static_cast<unsigned>(element.category);
+}
+
+void Symbol::Remove(const NameSpaceElement& element) {
+  if (m_newest == &element) {
+    m_newest = nullptr;
+  } else if (std::erase(m_declared, &element) == 0) {
+    std::erase(m_forward, &element);
+  }
+}
+
+bool Symbol::HasNameSpace(const IndexSet& files) const {
+  if (!(m_categories >> static_cast<unsigned>(Category::NameSpace) & 1)) return false;
+  auto counts = [&](const NameSpaceElement* element) {
+    return element->category == Category::NameSpace && files.Has(element->owner.index);
+  };
+  return (m_newest && counts(m_newest)) || std::any_of(m_declared.begin(), m_declared.end(), counts);
+}
+
+bool Symbol::IsDeclaredIn(const IndexSet& files) const {
+  auto counts = [&](const NameSpaceElement* element) { return files.Has(element->owner.index); };
+  return (m_newest && counts(m_newest)) || std::any_of(m_declared.begin(), m_declared.end(), counts) ||
+         std::any_of(m_forward.begin(), m_forward.end(), counts);
+}
+
+NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) const {
+  NameSpaceElement* result = own;
+  auto consider = [&](NameSpaceElement* element) {
+    if (!files.Has(element->owner.index)) return;
+    if (!result) {
+      result = element;
+      return;
+    }
+    const DeclStatus a = result->GetDeclStatus();
+    const DeclStatus b = element->GetDeclStatus();
+    if (result->category != element->category || (a != DeclStatus::Forward && a == b)) {
+      throw LexScannerException("Ambiguous identifier : " + result->name, nullptr);
+    }
+    if (b > a) result = element;
+  };
+  for (NameSpaceElement* element : m_declared) consider(element);
+  if (m_newest) consider(m_newest);
+  const bool mayDiffer = (m_categories & (m_categories - 1)) != 0;
+  for (NameSpaceElement* element : m_forward) {
+    if (result && !mayDiffer) break;
+    consider(element);
+  }
+  return result;
+}
+
+const Symbol* SymbolIndex::Find(std::string_view key) const {
+  auto found = m_symbols.find(key);
+  return found == m_symbols.end() ? nullptr : &found->second;
+}
+
+// --- Name spaces
+
+NameSpace::NameSpace(ScannedFile& owner, NameSpace* parent, std::string name)
+    : NameSpaceElement(owner, nullptr, Category::NameSpace),
+      m_keyPrefix(parent ? parent->m_keyPrefix + name + "::" : std::string()) {
+  this->name = std::move(name);
+  this->parent = parent;
+  status = DeclStatus::Defined;
+}
+
+bool NameSpace::HaveSomethingToRegister() const {
+  return std::any_of(m_elements.begin(), m_elements.end(),
+                     [](const auto& entry) { return entry.second->HaveSomethingToRegister(); });
+}
+
+void NameSpace::WriteReflection(TextWriter& out, RegistrationLists& lists) {
+  for (const auto& [elementName, element] : m_elements) element->WriteReflection(out, lists);
+}
+
+const Symbol* NameSpace::FindSymbol(std::string_view elementName) const {
+  const SymbolIndex& symbols = owner.host.Symbols();
+  return IsRoot() ? symbols.Find(elementName) : symbols.Find(m_keyPrefix + std::string(elementName));
+}
+
+NameSpaceElement* NameSpace::LookupLocal(std::string_view elementName) {
+  auto found = m_elements.find(elementName);
+  if (found != m_elements.end()) return found->second.get();
+  // A name space that an import opened stands here as well. It is made when first asked for.
+  const Symbol* symbol = FindSymbol(elementName);
+  return symbol && symbol->HasNameSpace(owner.mounted) ? FindOrCreateNameSpace(elementName) : nullptr;
+}
+
+NameSpaceElement* NameSpace::Lookup(std::string_view elementName) {
+  NameSpaceElement* own = LookupLocal(elementName);
+  if (own && own->category == Category::NameSpace) return own;
+  const Symbol* symbol = FindSymbol(elementName);
+  return symbol ? symbol->Choose(own, owner.mounted) : own;
+}
+
+NameSpaceElement* NameSpace::LookupPath(std::string_view path) {
+  NameSpace* scope = this;
+  for (size_t colons; (colons = path.find("::")) != std::string_view::npos; path.remove_prefix(colons + 2)) {
+    NameSpaceElement* element = scope->LookupLocal(path.substr(0, colons));
+    if (!element || element->category != Category::NameSpace) return nullptr;
+    scope = static_cast<NameSpace*>(element);
+  }
+  return scope->Lookup(path);
+}
+
+bool NameSpace::Sees(std::string_view elementName) const {
+  if (m_elements.contains(elementName)) return true;
+  const Symbol* symbol = FindSymbol(elementName);
+  return symbol && symbol->IsDeclaredIn(owner.mounted);
+}
+
+NameSpace* NameSpace::FindOrCreateNameSpace(std::string_view elementName) {
+  auto found = m_elements.find(elementName);
+  if (found == m_elements.end()) {
+    return &static_cast<NameSpace&>(Add(std::make_unique<NameSpace>(owner, this, std::string(elementName))));
+  }
+  return found->second->category == Category::NameSpace ? static_cast<NameSpace*>(found->second.get()) : nullptr;
+}
+
+NameSpaceElement& NameSpace::Add(std::unique_ptr<NameSpaceElement> element) {
+  element->parent = this;
+  NameSpaceElement& added = *element;
+  std::unique_ptr<NameSpaceElement>& slot = m_elements[added.name];
+  Symbol& symbol = owner.host.Symbols().Enter(m_keyPrefix + added.name);
+  if (slot) {
+    symbol.Remove(*slot);
+    m_replaced.push_back(std::move(slot));
+  }
+  slot = std::move(element);
+  symbol.Enter(added);
+  return added;
+}
+
+}  // namespace qrex
