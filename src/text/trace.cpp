@@ -123,6 +123,13 @@ void WriteToConsole(std::string_view text) {
   platform::WriteStdout(platform::WidenBytes(text));
 }
 
+bool HintsAreShown() { return platform::StdoutIsTerminal(); }
+
+std::string Hint(std::string_view text) {
+  if (text.empty() || !HintsAreShown()) return {};
+  return "    hint: " + std::string(text) + "\n";
+}
+
 TraceIndentScope::TraceIndentScope(int64_t columns) : m_columns(columns) { traceIndent += columns; }
 TraceIndentScope::~TraceIndentScope() { traceIndent -= m_columns; }
 
