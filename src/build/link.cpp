@@ -146,6 +146,7 @@ void HintAtUnbuiltLibraries(const ProjectBuilder& builder) {
   for (const std::string& path : project.subprojects) {
     const Project* library = project.workspace->FindSubproject(path);
     if (!library || library->usesQrex || library->exported || !IsLibrary(library->targetType)) continue;
+    if (IsGccFamily(builder.settings.compiler) && LastWriteTime(GccTargetPath(*library, builder.config)) != 0) continue;
     TraceWriter() << Hint(library->filePath + " does not say qrex: this program does not build " + library->name +
                           ", which " + project.name + " links against");
   }

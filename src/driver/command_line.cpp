@@ -137,7 +137,8 @@ int RunInit(const std::vector<std::string>& arguments) {
     WriteToConsole("Usage: Qrex --init NAME [FOLDER]\n");
     return 1;
   }
-  return InitWorkspace(arguments[2], NormalisePath(arguments.back())) ? 0 : 1;
+  const std::string folder = NormalisePath(arguments.back());
+  return InitWorkspace(arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
 }
 
 // What the first argument may ask for in place of a run.

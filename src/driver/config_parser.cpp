@@ -16,15 +16,9 @@ const Row* FindRow(const Row (&rows)[n], const LexToken& token) {
   return nullptr;
 }
 
-std::string ValidWords(bool ofMode) {
-  std::string words = "one of";
-  if (ofMode) {
-    for (const ModeWord& mode : kModes) words.append(" ").append(mode.word);
-  } else {
-    for (int i = 0; i <= static_cast<int>(CompilerKind::clang); ++i) {
-      words.append(" ").append(CompilerKeyword(static_cast<CompilerKind>(i)));
-    }
-  }
+std::string ModeWords() {
+  std::string words;
+  for (const ModeWord& mode : kModes) words.append(words.empty() ? "" : " ").append(mode.word);
   return words;
 }
 
@@ -75,7 +69,8 @@ void ConfigParser::ParseStatement() {
       m_settings.compiler = *compiler;
       return;
     }
-    throw LexScannerException("Invalid option : " + Printed(token), token).WithHint(ValidWords(isMode));
+    throw LexScannerException("Invalid option : " + Printed(token), token)
+        .WithHint("one of " + (isMode ? ModeWords() : CompilerWords()));
   }
   if (current.kind == kDollar) return ParseVariable();
   if (const auto* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);

@@ -1,5 +1,7 @@
 #include "driver/help.h"
 
+#include <algorithm>
+
 #include "driver/config_keys.h"
 #include "text/version.h"
 
@@ -49,11 +51,7 @@ std::string HelpText() {
     page.Row(kModes[i].word, Word(kModes[i].help, isDefault ? "; the default" : ""));
   }
   page.Heading("Keys with their defaults; $(name) expands in every string");
-  std::string compilers;
-  for (int i = 0; i <= static_cast<int>(CompilerKind::clang); ++i) {
-    compilers.append(i > 0 ? " " : "").append(CompilerKeyword(static_cast<CompilerKind>(i)));
-  }
-  page.Row(Word("compiler = ", CompilerKeyword(defaults.compiler)), "one of " + compilers);
+  page.Row(Word("compiler = ", CompilerKeyword(defaults.compiler)), "one of " + CompilerWords());
   for (const auto& key : kListKeys) page.Row(Word(key.word, " = { }"), key.help);
   for (const auto& key : kStringKeys) page.Row(Word(key.word, " = \"\""), key.help);
   for (const auto& key : kBoolKeys) page.Row(Word(key.word, defaults.*key.field ? " = true" : " = false"), key.help);

@@ -123,10 +123,8 @@ void WriteToConsole(std::string_view text) {
   platform::WriteStdout(platform::WidenBytes(text));
 }
 
-bool HintsAreShown() { return platform::StdoutIsTerminal(); }
-
 std::string Hint(std::string_view text) {
-  if (text.empty() || !HintsAreShown()) return {};
+  if (text.empty() || !platform::StdoutIsTerminal()) return {};
   return "    hint: " + std::string(text) + "\n";
 }
 

@@ -24,7 +24,6 @@ void WriteToConsole(std::string_view text);
 // The line of a hint, to be written behind a message on a terminal; empty where a pipe or a file takes the output,
 // which holds messages alone.
 std::string Hint(std::string_view text);
-bool HintsAreShown();  // whether it is worth looking for more to tell
 
 class TraceIndentScope {
  public:
