@@ -8,7 +8,9 @@
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
+#include "text/trace.h"
 #include "workspace/linker_text.h"
+#include "workspace/workspace.h"
 
 namespace qrex {
 
@@ -136,6 +138,22 @@ std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   return inputs;
 }
 
+namespace {
+
+// What is not marked `qrex` is built by others; a link that fails may do so for want of it.
+void HintAtUnbuiltLibraries(const ProjectBuilder& builder) {
+  const Project& project = builder.project;
+  for (const std::string& path : project.subprojects) {
+    const Project* library = project.workspace->FindSubproject(path);
+    if (!library || library->usesQrex || library->exported || !IsLibrary(library->targetType)) continue;
+    if (IsGccFamily(builder.settings.compiler) && LastWriteTime(GccTargetPath(*library, builder.config)) != 0) continue;
+    TraceWriter() << Hint(library->filePath + " does not say qrex: this program does not build " + library->name +
+                          ", which " + project.name + " links against");
+  }
+}
+
+}  // namespace
+
 bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
   const std::string responseFile = builder.IntermediateDirectory() + "/linker.rsp";
   const bool isGcc = IsGccFamily(builder.settings.compiler);
@@ -157,6 +175,7 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
     TraceWriter() << "Error writing " << text << " - linking failed\n";
   }
   if (linked) return true;
+  HintAtUnbuiltLibraries(builder);
   ++builder.errorCount;
   if (isGcc || IsAbnormalEnd(returnCode)) DeleteFile(target);  // half a target must not pass for a good one
   return false;

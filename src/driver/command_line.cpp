@@ -1,18 +1,20 @@
 #include "driver/command_line.h"
 
 #include "driver/config_parser.h"
+#include "driver/help.h"
+#include "driver/init.h"
 #include "driver/run_workspace.h"
 #include "lex/literals.h"
 #include "platform/system.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
 #include "text/trace.h"
+#include "text/version.h"
 
 namespace qrex {
 
 namespace {
 
-constexpr char kBanner[] = "Qrex V2.20 Oct  7 2020\n";
 constexpr char kUsage[] = "Usage...\nQrex pathToConfigFile\n";
 
 void WriteArgument(size_t index, const std::string& argument, const std::string& remark = {}) {
@@ -90,7 +92,7 @@ void CommandLine::RunParallelBuild() {
 }
 
 int CommandLine::Run() {
-  WriteToConsole(kBanner);
+  WriteToConsole(std::string(ProductLine()) + "\n");
   OpenTrace("stdout", false, false);
   if (m_arguments.size() < 2) {
     WriteToConsole(kUsage);
@@ -127,9 +129,38 @@ int CommandLine::Run() {
 
 }  // namespace
 
+namespace {
+
+// The arguments behind --init: a name, and perhaps a folder.
+int RunInit(const std::vector<std::string>& arguments) {
+  if (arguments.size() < 3 || arguments.size() > 4) {
+    WriteToConsole("Usage: Qrex --init NAME [FOLDER]\n");
+    return 1;
+  }
+  const std::string folder = NormalisePath(arguments.back());
+  return InitWorkspace(arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
+}
+
+// What the first argument may ask for in place of a run.
+int Dispatch(const std::vector<std::string>& arguments) {
+  const std::string_view first = arguments.size() > 1 ? arguments[1] : std::string_view();
+  if (first == "--init") return RunInit(arguments);
+  if (first == "--help") {
+    WriteToConsole(HelpText());
+    return 0;
+  }
+  if (first == "--version") {
+    WriteToConsole("Qrex " + std::string(Version()) + "\n");
+    return 0;
+  }
+  return CommandLine(arguments).Run();
+}
+
+}  // namespace
+
 int RunCommandLine(const std::vector<std::string>& arguments) {
   try {
-    return CommandLine(arguments).Run();
+    return Dispatch(arguments);
   } catch (const IException& exception) {
     TraceWriter() << exception << "\n";
   } catch (const std::exception& exception) {

@@ -1,73 +1,12 @@
 #include "driver/config_parser.h"
 
+#include "driver/config_keys.h"
 #include "lex/literals.h"
 #include "text/paths.h"
 
 namespace qrex {
 
 namespace {
-
-struct StringKey {
-  std::string_view word;
-  std::string ConfigSettings::*field;
-};
-constexpr StringKey kStringKeys[] = {
-    {"config", &ConfigSettings::config},
-    {"platform", &ConfigSettings::platform},
-    {"systemName", &ConfigSettings::systemName},
-    {"systemProcessor", &ConfigSettings::systemProcessor},
-    {"systemVersion", &ConfigSettings::systemVersion},
-    {"sizeofPointer", &ConfigSettings::sizeofPointer},
-};
-
-struct BoolKey {
-  std::string_view word;
-  bool ConfigSettings::*field;
-};
-constexpr BoolKey kBoolKeys[] = {
-    {"targetXP", &ConfigSettings::targetXP},
-    {"defaultToDll", &ConfigSettings::defaultToDll},
-    {"diagnostics", &ConfigSettings::diagnostics},
-    {"translateOnly", &ConfigSettings::translateOnly},
-    {"rebuildAll", &ConfigSettings::rebuildAll},
-    {"exportPublicHeaders", &ConfigSettings::exportPublicHeaders},
-    {"repackageExecutableTargets", &ConfigSettings::repackageExecutableTargets},
-    {"solutionContainsPrepackagedProjects", &ConfigSettings::solutionContainsPrepackagedProjects},
-    {"makeTranslatedFilesReadOnly", &ConfigSettings::makeTranslatedFilesReadOnly},
-    {"makeExportedHeaderFilesReadOnly", &ConfigSettings::makeExportedHeaderFilesReadOnly},
-    {"writeTokenEquivalent", &ConfigSettings::writeTokenEquivalent},
-};
-
-struct ListKey {
-  std::string_view word;
-  std::vector<std::string> ConfigSettings::*field;
-};
-constexpr ListKey kListKeys[] = {
-    {"virtualTree", &ConfigSettings::virtualTree},
-    {"workspaces", &ConfigSettings::workspaces},
-};
-
-struct EnvironmentKey {
-  std::string_view word;
-  std::string PlatformEnvironment::*field;
-};
-constexpr EnvironmentKey kEnvironmentKeys[] = {
-    {"PATH", &PlatformEnvironment::PATH},
-    {"INCLUDE", &PlatformEnvironment::INCLUDE},
-    {"LIB", &PlatformEnvironment::LIB},
-};
-
-struct PathVariable {
-  std::string_view name;
-  std::string ConfigSettings::*field;
-};
-constexpr PathVariable kPathVariables[] = {
-    {"EXPORT_LIB", &ConfigSettings::exportLib},
-    {"EXPORT_TRANSLATED_INCLUDE", &ConfigSettings::exportTranslatedInclude},
-    {"EXPORT_UNTRANSLATED_INCLUDE", &ConfigSettings::exportUntranslatedInclude},
-};
-
-constexpr std::string_view kModes[] = {"clean", "compile", "build", "gen", "show"};
 
 template <typename Row, size_t n>
 const Row* FindRow(const Row (&rows)[n], const LexToken& token) {
@@ -77,6 +16,12 @@ const Row* FindRow(const Row (&rows)[n], const LexToken& token) {
   return nullptr;
 }
 
+std::string ModeWords() {
+  std::string words;
+  for (const ModeWord& mode : kModes) words.append(words.empty() ? "" : " ").append(mode.word);
+  return words;
+}
+
 class ConfigParser : public MpfwParser {
  public:
   explicit ConfigParser(ConfigSettings& settings) : MpfwParser(settings.context), m_settings(settings) {}
@@ -84,6 +29,7 @@ class ConfigParser : public MpfwParser {
   bool ResolveImport(const std::string& path, std::string& found) override {
     return FindImport(m_settings, path, found);
   }
+  std::string ImportHint(const std::string& path) const override { return TriedImports(m_settings, path); }
   void OnImportedFile(MpfwSourceFile& file) override {
     ConfigParser parser(m_settings);
     ParseImported(file, parser, [](MpfwParser& imported) { static_cast<ConfigParser&>(imported).ParseStatements(); });
@@ -115,7 +61,7 @@ void ConfigParser::ParseStatement() {
     const std::string word = ReadWord();
     if (isMode) {
       for (size_t i = 0; i < std::size(kModes); ++i) {
-        if (word != kModes[i]) continue;
+        if (word != kModes[i].word) continue;
         m_settings.mode = static_cast<RunMode>(i);
         return;
       }
@@ -123,17 +69,18 @@ void ConfigParser::ParseStatement() {
       m_settings.compiler = *compiler;
       return;
     }
-    throw LexScannerException("Invalid option : " + Printed(token), token);
+    throw LexScannerException("Invalid option : " + Printed(token), token)
+        .WithHint("one of " + (isMode ? ModeWords() : CompilerWords()));
   }
   if (current.kind == kDollar) return ParseVariable();
-  if (const EnvironmentKey* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
-  if (const ListKey* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
-  if (const StringKey* key = FindRow(kStringKeys, current)) {
+  if (const auto* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
+  if (const auto* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
+  if (const auto* key = FindRow(kStringKeys, current)) {
     Advance();
     Expect(kAssign, "=");
     return ReadStringOrExpression(m_settings.*key->field);
   }
-  if (const BoolKey* key = FindRow(kBoolKeys, current)) {
+  if (const auto* key = FindRow(kBoolKeys, current)) {
     Advance();
     Expect(kAssign, "=");
     std::string word = current.text.Text();
@@ -142,7 +89,8 @@ void ConfigParser::ParseStatement() {
     m_settings.*key->field = word == "true";
     return Advance();
   }
-  throw LexScannerException("Syntax error: " + Printed(current), current);
+  throw LexScannerException("Syntax error: " + Printed(current), current)
+      .WithHint("no statement begins so; Qrex --help lists the keys");
 }
 
 std::string ConfigParser::ReadWord() {
@@ -156,8 +104,8 @@ void ConfigParser::ParseVariable() {
   std::string name, value;
   ParseVariableStatement(&name, &value);
   TraceWriter() << "$" << name << " = " << value << "\n";
-  for (const PathVariable& variable : kPathVariables) {
-    if (name == variable.name) m_settings.*variable.field = value;
+  for (const auto& variable : kPathVariables) {
+    if (name == variable.word) m_settings.*variable.field = value;
   }
   if (name == "COMPILE_FILE_PATH") m_settings.compileFilePath = NormalisePath(value);
   if (name == "TARGET_DIR" && !value.empty()) SplitTargetDirectory(NormalisePath(value));
@@ -267,7 +215,7 @@ std::string ValidateSettings(const ConfigSettings& settings) {
   if (!runsTools) return {};
   const PlatformEnvironment* environment = settings.Environment();
   if (!environment) return "\nERROR:  PATH, INCLUDE, LIB not set for platform " + settings.platform + "\n";
-  for (const EnvironmentKey& key : kEnvironmentKeys) {
+  for (const auto& key : kEnvironmentKeys) {
     if (!(environment->*key.field).empty()) continue;
     return "\nERROR:  " + std::string(key.word) + " not specified for platform " + settings.platform + "\n";
   }

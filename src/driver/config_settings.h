@@ -58,5 +58,8 @@ void ApplyEnvironment(const PlatformEnvironment& environment);
 bool FindImport(const ConfigSettings& settings, const std::string& path, std::string& found);
 // The first virtualTree root under which the path exists, and the full path there.
 bool FindInTree(const ConfigSettings& settings, const std::string& path, std::string& root, std::string& fullPath);
+// Hints for what these did not find: the paths that were tried.
+std::string TriedImports(const ConfigSettings& settings, const std::string& path);
+std::string TriedInTree(const ConfigSettings& settings, const std::string& path);
 
 }  // namespace qrex

@@ -35,6 +35,7 @@ class WorkspaceRun {
   bool RunProjects(ScopeTimer& timer);
   void GenerateProject(Project& project);
   bool ProcessProject(Project& project);
+  void ReportLeftOut(size_t firstIndex) const;
   void Prepare(const Project& project);
   void MakeDirectories(const Project& project);
   void CreateMissingFiles(Project& project) const;
@@ -97,7 +98,7 @@ bool WorkspaceRun::LoadAll() {
 bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
   std::string fullPath;
   if (!FindInTree(m_settings, entry, m_workspace.rootDir, fullPath)) {
-    TraceWriter() << "Error: Couldn't open workspace file " << entry << "\n";
+    TraceWriter() << "Error: Couldn't open workspace file " << entry << "\n" << Hint(TriedInTree(m_settings, entry));
     return false;
   }
   CopyIfNewer(fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
@@ -148,8 +149,10 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     for (const auto& project : m_workspace.projects) GenerateProject(*project);
     GenerateWorkspace();
   } else {
-    for (const auto& project : m_workspace.projects) {
-      if (!ProcessProject(*project)) return false;
+    for (size_t i = 0; i < m_workspace.projects.size(); ++i) {
+      if (ProcessProject(*m_workspace.projects[i])) continue;
+      ReportLeftOut(i + 1);
+      return false;
     }
   }
   TraceWriter() << "\n";
@@ -159,6 +162,13 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     timer.Label() << " with " << m_warnings << " warnings, " << m_errors << " errors";
   }
   return true;
+}
+
+// After an error that ends the run.
+void WorkspaceRun::ReportLeftOut(size_t firstIndex) const {
+  std::string names;
+  for (size_t i = firstIndex; i < m_workspace.projects.size(); ++i) names += " " + m_workspace.projects[i]->name;
+  if (!names.empty()) TraceWriter() << Hint("the run ends here and leaves out:" + names);
 }
 
 // Builds or cleans.
@@ -221,7 +231,7 @@ void WorkspaceRun::CreateMissingFiles(Project& project) const {
   for (const ProjectFile* file : project.files) {
     const std::string path = project.SourcePath(*file);
     if (files.Exists(path)) continue;
-    WriteToConsole("Creating missing file " + path + "\n");
+    WriteToConsole("Creating missing file " + path + "\n" + Hint(project.ListingHint(*file)));
     if (!CreateEmptyFile(path, false)) WriteToConsole("Error creating " + path + "\n");
   }
 }
@@ -235,11 +245,23 @@ void WorkspaceRun::Repackage(const Project& project) const {
   CopyIfNewer(PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
 }
 
+namespace {
+
+std::string KnownConfigs(const Project& project) {
+  if (project.configs.empty()) return project.filePath + " has no config { ... }";
+  std::string text = project.filePath + " has";
+  for (const auto& config : project.configs) text += " " + config->name + "|" + config->platform;
+  return text;
+}
+
+}  // namespace
+
 ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
   ProjectConfig* config = project.FindConfig(m_settings.config, m_settings.platform);
   if (!config) {
     TraceWriter() << "Error: There is no configuration " << m_settings.config << "|" << m_settings.platform
-                  << " in project " << project.name << "\n";
+                  << " in project " << project.name << "\n"
+                  << Hint(KnownConfigs(project));
   }
   return config;
 }
@@ -251,7 +273,7 @@ bool Guarded(Work work) {
     work();
     return true;
   } catch (const LexScannerException& exception) {
-    TraceWriter() << "\n" << exception << "\n";
+    TraceWriter() << "\n" << exception << "\n" << Hint(exception.hint);
   } catch (const IException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
   }
@@ -294,7 +316,8 @@ ProjectFile* WorkspaceRun::FindCompileFile(bool& found) {
   std::string root, relative;
   found = FindWorkspaceRoot(m_settings.compileFilePath, root, relative);
   if (!found) {
-    TraceWriter() << "Search for " << kMarkerFile << " failed\n";
+    TraceWriter() << "Search for " << kMarkerFile << " failed\n"
+                  << Hint("an empty file of that name marks the root of the tree, above " + m_settings.compileFilePath);
     return nullptr;
   }
   ProjectFile* file = m_workspace.FindFile(relative);

@@ -153,8 +153,13 @@ class LexScannerException : public IException {
 
   void Write(TextWriter& writer) const override;  // file(line) : error : message
   virtual const char* Message() const { return message.c_str(); }
+  LexScannerException& WithHint(std::string text) {
+    hint = std::move(text);
+    return *this;
+  }
 
   std::string message;  // enclosing contexts append to it and patch it on the way out
+  std::string hint;     // what a terminal shows behind the message
   std::string file;     // empty until located
   int64_t line = -1;
   const char* position;

@@ -224,7 +224,9 @@ void ExpansionContext::Import() {
     DropToScanner();
     EmitGenerated("@import \"" + path + "\"");
   }
-  if (!m_handler->Import(m_frame, path, token.text.begin)) FailAt(token, "Can't import file: " + path);
+  if (!m_handler->Import(m_frame, path, token.text.begin)) {
+    throw LexScannerException("Can't import file: " + path, token).WithHint(m_handler->ImportHint(path));
+  }
 }
 
 void ExpansionContext::ImportPath() {

@@ -20,6 +20,7 @@ int64_t parts = 0;  // of the text at nesting 0
 ExpansionLimits expansionLimits;
 
 bool ImportHandler::ImportPath(const std::string&, const char*) { return false; }
+std::string ImportHandler::ImportHint(const std::string&) const { return {}; }
 
 std::string WithToken(std::string_view message, const LexToken& token) { return std::string(message) + Printed(token); }
 

@@ -13,6 +13,8 @@ class ImportHandler {
  public:
   virtual bool ImportPath(const std::string& path, const char* position);                  // false: not supported here
   virtual bool Import(LSFrame& frame, const std::string& path, const char* position) = 0;  // false: not found
+  // What to tell on a terminal when a file was not found: where it was looked for.
+  virtual std::string ImportHint(const std::string& path) const;
   virtual ~ImportHandler() = default;
 };
 

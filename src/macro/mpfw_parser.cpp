@@ -20,7 +20,9 @@ bool MpfwParser::Import(LSFrame&, const std::string& path, const char* position)
   std::string expanded = path;
   SubstituteVariables(expanded);
   std::string found;
-  if (!ResolveImport(expanded, found)) throw LexScannerException("Couldn't open file " + expanded, position);
+  if (!ResolveImport(expanded, found)) {
+    throw LexScannerException("Couldn't open file " + expanded, position).WithHint(ImportHint(expanded));
+  }
   if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", position);
   ++m_importDepth;
   const bool loaded = LoadSourceFile(found) != nullptr;
@@ -39,6 +41,7 @@ MpfwSourceFile* MpfwParser::LoadSourceFile(const std::string& path, const std::s
   file.path = path;
   file.text = std::move(text);
   if (!extraText.empty() && !file.text.empty() && file.text.back() != '\n') file.text += '\n';  // lines of their own
+  if (!extraText.empty()) file.addedText = file.text.size();
   file.text += extraText;
   context.sourceFiles.push_back(std::move(made));  // ahead of the expansion, so that its errors are found in it
   return ExpandSourceFile(file) ? &file : nullptr;
@@ -125,7 +128,9 @@ bool MpfwParser::ParseImportStatement() {
   Advance();
   std::string path, found;
   ReadString(path);
-  if (!ResolveImport(path, found)) throw LexScannerException("Couldn't open file " + path, previous);
+  if (!ResolveImport(path, found)) {
+    throw LexScannerException("Couldn't open file " + path, previous).WithHint(ImportHint(path));
+  }
   if (MpfwSourceFile* file = FindLoaded(found)) OnImportedFile(*file);
   Advance();
   return true;

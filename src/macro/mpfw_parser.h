@@ -18,6 +18,7 @@ struct MpfwSourceFile {
   virtual ~MpfwSourceFile() = default;
   std::string path;
   std::string text;
+  size_t addedText = std::string::npos;  // where the lines that were added to the file begin
   std::string expansion;
   SourceMap map;
 };

@@ -8,6 +8,7 @@
 #include "lex/sections.h"
 #include "macro/mpfw_parser.h"
 #include "platform/file_system.h"
+#include "text/trace.h"
 
 namespace qrex {
 
@@ -93,12 +94,41 @@ bool FindSourceLine(const SourceFileList& files, const char* position, std::stri
   return false;
 }
 
+bool FindExpandedLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line) {
+  for (const auto& file : files) {
+    const TextRange expansion{std::string_view(file->expansion)};
+    if (!position || !expansion.Contains(position)) continue;
+    return FindSourceLine(files, MapOutputOffset(file->map, position - expansion.begin), path, line);
+  }
+  return false;
+}
+
+namespace {
+
+// The added line of the command line in which the position lies; empty elsewhere.
+std::string_view AddedLine(const SourceFileList& files, const char* position) {
+  for (const auto& file : files) {
+    const std::string_view text = file->text;
+    if (!position || !TextRange(text).Contains(position)) continue;
+    const size_t at = static_cast<size_t>(position - text.data());
+    if (at < file->addedText) return {};
+    const size_t begin = text.rfind('\n', at == 0 ? at : at - 1) + 1;  // the line end itself is of the line it ends
+    return text.substr(begin, text.find('\n', at) - begin);
+  }
+  return {};
+}
+
+}  // namespace
+
 void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception) {
   std::string path;
   int64_t line;
   writer << "\n";
   if (FindSourceLine(files, exception.position, path, line)) writer << path << "(" << line << ") : ";
-  writer << exception.message << "\n";
+  writer << exception.message << "\n" << Hint(exception.hint);
+  if (const std::string_view added = AddedLine(files, exception.position); !added.empty()) {
+    writer << Hint("this line is none of the file, it stands on the command line: " + std::string(added));
+  }
 }
 
 void ExpansionSink::MakeRoom() {

@@ -74,6 +74,9 @@ void MapErrorPosition(const SourceMap& map, const TextRange& output, LexScannerE
 struct MpfwSourceFile;
 using SourceFileList = std::vector<std::unique_ptr<MpfwSourceFile>>;
 bool FindSourceLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
+// The same for a position in the expansion of one of the files.
+bool FindExpandedLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
+// With its hint behind it, also on whether the place was added to the file by the command line.
 void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception);
 
 // The column at which the lines of an expansion begin. Most expansions stand within a line, so that it is kept as a

@@ -11,6 +11,7 @@
 #include <boost/uuid/uuid.hpp>
 #include <cerrno>
 #include <chrono>
+#include <climits>
 #include <csignal>
 #include <cstdlib>
 #include <ctime>
@@ -167,6 +168,13 @@ int RunCommand(const std::string& line) {
 }
 
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
+
+std::string ProgramPath() {
+  std::string path(PATH_MAX, '\0');
+  const ssize_t length = readlink("/proc/self/exe", path.data(), path.size());
+  path.resize(length > 0 ? static_cast<size_t>(length) : 0);
+  return path;
+}
 
 uint64_t CurrentThreadId() { return static_cast<uint64_t>(gettid()); }
 uint64_t CurrentProcessId() { return static_cast<uint64_t>(getpid()); }

@@ -19,6 +19,7 @@ int RunCommand(const std::string& line);
 void SetEnvironment(const std::string& name, const std::string& value);
 constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
 
+std::string ProgramPath();  // of this program, with symbolic links resolved; empty where the system does not tell
 uint64_t CurrentThreadId();
 uint64_t CurrentProcessId();
 bool IsProcessRunning(uint64_t id);

@@ -123,6 +123,11 @@ void WriteToConsole(std::string_view text) {
   platform::WriteStdout(platform::WidenBytes(text));
 }
 
+std::string Hint(std::string_view text) {
+  if (text.empty() || !platform::StdoutIsTerminal()) return {};
+  return "    hint: " + std::string(text) + "\n";
+}
+
 TraceIndentScope::TraceIndentScope(int64_t columns) : m_columns(columns) { traceIndent += columns; }
 TraceIndentScope::~TraceIndentScope() { traceIndent -= m_columns; }
 

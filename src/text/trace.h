@@ -21,6 +21,10 @@ void WriteToTrace(std::string_view text);  // what a TraceWriter's end calls
 // Writes to standard output as UTF-8 through the console writer, unbuffered by the tool.
 void WriteToConsole(std::string_view text);
 
+// The line of a hint, to be written behind a message on a terminal; empty where a pipe or a file takes the output,
+// which holds messages alone.
+std::string Hint(std::string_view text);
+
 class TraceIndentScope {
  public:
   explicit TraceIndentScope(int64_t columns);

@@ -36,17 +36,43 @@ void ApplyEnvironment(const PlatformEnvironment& environment) {
   platform::SetEnvironment("LIB", environment.LIB);
 }
 
-bool FindImport(const ConfigSettings& settings, const std::string& path, std::string& found) {
-  found = path;
-  if (!platform::IsValidUtf8(path)) return false;
-  if (FileExists(found)) return true;
+namespace {
+
+std::string Tried(const std::vector<std::string>& paths, const ConfigSettings& settings) {
+  std::string text = "not found as ";
+  for (const std::string& path : paths) text += (&path == &paths.front() ? "" : ", ") + path;
+  if (settings.virtualTree.empty()) text += "; virtualTree has no roots";
+  return text + " (relative paths begin in the folder where Qrex runs)";
+}
+
+std::vector<std::string> ImportCandidates(const ConfigSettings& settings, const std::string& path) {
+  std::vector<std::string> candidates{path};
   for (const auto* directories : {&settings.context.importPaths, &settings.virtualTree}) {
-    for (const std::string& directory : *directories) {
-      found = PathJoin(directory, path);
-      if (FileExists(found)) return true;
-    }
+    for (const std::string& directory : *directories) candidates.push_back(PathJoin(directory, path));
+  }
+  return candidates;
+}
+
+}  // namespace
+
+bool FindImport(const ConfigSettings& settings, const std::string& path, std::string& found) {
+  if (!platform::IsValidUtf8(path)) return false;
+  for (std::string& candidate : ImportCandidates(settings, path)) {
+    if (!FileExists(candidate)) continue;
+    found = std::move(candidate);
+    return true;
   }
   return false;
+}
+
+std::string TriedImports(const ConfigSettings& settings, const std::string& path) {
+  return Tried(ImportCandidates(settings, path), settings);
+}
+
+std::string TriedInTree(const ConfigSettings& settings, const std::string& path) {
+  std::vector<std::string> candidates;
+  for (const std::string& root : settings.virtualTree) candidates.push_back(PathJoin(root, path));
+  return Tried(candidates, settings);
 }
 
 bool FindInTree(const ConfigSettings& settings, const std::string& path, std::string& root, std::string& fullPath) {

@@ -31,6 +31,7 @@ void ProjectParser::ParseTree(ProjectFolder& folder, const std::string& director
 }
 
 void ProjectParser::ParseEntry(ProjectFolder& folder, const std::string& directory) {
+  m_entry = current.text.begin;
   if (current.Is("directories")) {
     ParseDirectories();
   } else if (IsFilterNext()) {
@@ -200,6 +201,7 @@ ProjectFile& ProjectParser::AddFile(ProjectFolder& folder, const std::string& pa
   ProjectFile& file = *slot;
   file.project = &m_project;
   file.path = path;
+  file.listedAt = m_entry;
   file.name = displayName;
   if (!StemOf(displayName, file.stem)) file.stem = std::string(FileNameOf(displayName));
   const size_t dot = displayName.rfind('.');
@@ -236,7 +238,8 @@ void ProjectParser::ParseExclude(const Files& files) {
 void ProjectParser::ParseFileOption(const Files& files) {
   if (current.Is("exclude")) return ParseExclude(files);
   if (current.kind != kPlus && current.kind != kMinus) {
-    throw LexScannerException("Unknown option : " + Printed(current), current);
+    throw LexScannerException("Unknown option : " + Printed(current), current)
+        .WithHint("an option of a file is one of exclude, +cpp, -cpp");
   }
   const bool add = current.kind == kPlus;
   Advance();

@@ -74,6 +74,13 @@ ProjectConfig* Project::FindConfig(const std::string& configName, const std::str
 
 std::string Project::SourcePath(const ProjectFile& file) const { return PathJoin(rootDir, file.path); }
 
+std::string Project::ListingHint(const ProjectFile& file) const {
+  std::string path;
+  int64_t line;
+  if (!FindExpandedLine(settings->sourceFiles, file.listedAt, path, line)) return {};
+  return file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+}
+
 namespace {
 
 void AddFoldersOf(ProjectFolder& folder, std::vector<ProjectFolder*>& folders) {

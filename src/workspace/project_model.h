@@ -71,7 +71,8 @@ struct ProjectFile {
   std::vector<std::unique_ptr<FileConfigRecord>> configRecords;
   ProjectFile* pairedHeader = nullptr;
   ProjectFile* pairedSource = nullptr;
-  bool excluded = false;  // from all configurations
+  bool excluded = false;           // from all configurations
+  const char* listedAt = nullptr;  // the entry, in the expansion of a project file
 
   FileConfigRecord* FindRecord(const ProjectConfig& config) const;  // or null
   FileConfigRecord& RecordOf(ProjectConfig& config);                // created on first need
@@ -91,7 +92,8 @@ struct Project {
   bool AddSubproject(const std::string& path);  // false, with a warning line, when it was there already
   const std::string& MangledProjDir();          // rootToProjDir with `/` as `_`
   ProjectConfig* FindConfig(const std::string& name, const std::string& platform) const;  // or null
-  std::string SourcePath(const ProjectFile& file) const;  // rootDir joined with the file's path
+  std::string SourcePath(const ProjectFile& file) const;   // rootDir joined with the file's path
+  std::string ListingHint(const ProjectFile& file) const;  // for a file that is missing: where it is listed
 
   Workspace* workspace;
   ConfigSettings* settings;

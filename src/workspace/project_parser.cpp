@@ -6,6 +6,7 @@
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
+#include "text/trace.h"
 #include "workspace/switch_blocks.h"
 #include "workspace/workspace.h"
 
@@ -16,7 +17,7 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   MpfwSourceFile& file = *made;
   if (!FindInTree(*project.settings, path, project.rootDir, project.filePath) ||
       !LoadText(file.text, project.filePath, true)) {
-    TraceWriter() << "Error: Couldn't open project file " << path << "\n";
+    TraceWriter() << "Error: Couldn't open project file " << path << "\n" << Hint(TriedInTree(*project.settings, path));
     return false;
   }
   file.path = project.filePath;
@@ -41,6 +42,8 @@ bool LoadProjectFile(Project& project, const std::string& path) {
 bool ProjectParser::ResolveImport(const std::string& path, std::string& found) {
   return FindImport(*m_project.settings, path, found);
 }
+
+std::string ProjectParser::ImportHint(const std::string& path) const { return TriedImports(*m_project.settings, path); }
 
 void ProjectParser::OnImportedFile(MpfwSourceFile& file) {
   ProjectParser parser(m_project, m_directoryFilter);

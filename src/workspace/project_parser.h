@@ -21,6 +21,7 @@ class ProjectParser : public MpfwParser {
       : MpfwParser(project.context), m_project(project), m_directoryFilter(directoryFilter) {}
 
   bool ResolveImport(const std::string& path, std::string& found) override;
+  std::string ImportHint(const std::string& path) const override;
   void OnImportedFile(MpfwSourceFile& file) override;
 
   void ParseProject();     // on the processed text
@@ -87,6 +88,7 @@ class ProjectParser : public MpfwParser {
   Project& m_project;
   FileFilter& m_directoryFilter;
   size_t m_depth = 0;
+  const char* m_entry = nullptr;  // of the file tree, which is being read
 };
 
 }  // namespace qrex

@@ -14,6 +14,10 @@ bool WorkspaceParser::ResolveImport(const std::string& path, std::string& found)
   return FindImport(m_workspace.settings, path, found);
 }
 
+std::string WorkspaceParser::ImportHint(const std::string& path) const {
+  return TriedImports(m_workspace.settings, path);
+}
+
 std::string WorkspaceParser::ParseWorkspace() {
   while (ParseImportStatement()) {
   }
@@ -53,7 +57,10 @@ void WorkspaceParser::ParseBlock(Project* parent) {
 void WorkspaceParser::ParseNested(const std::string& path) {
   std::string root, fullPath;
   const bool exists = FindInTree(m_workspace.settings, path, root, fullPath);
-  if (!exists) throw LexScannerException("Couldn't open workspace file " + path, previous);
+  if (!exists) {
+    throw LexScannerException("Couldn't open workspace file " + path, previous)
+        .WithHint(TriedInTree(m_workspace.settings, path));
+  }
   CopyIfNewer(fullPath, m_workspace.settings.exportUntranslatedInclude + "/" + path, true);
   for (const WorkspaceParser* open = this; open; open = open->m_outer) {
     if (open->m_path == fullPath) throw LexScannerException("Workspace file includes itself : " + path, previous);

@@ -15,6 +15,7 @@ class WorkspaceParser : public MpfwParser {
       : MpfwParser(workspace.context), m_workspace(workspace), m_path(std::move(path)), m_outer(outer) {}
 
   bool ResolveImport(const std::string& path, std::string& found) override;
+  std::string ImportHint(const std::string& path) const override;
   void OnImportedFile(MpfwSourceFile&) override {}  // brings macros and variables, no projects
 
   // On the processed text of a workspace file; the workspace's name.

@@ -1,6 +1,7 @@
 #include "translator/symbols/scanned_file.h"
 
 #include <algorithm>
+#include <array>
 #include <unordered_set>
 
 #include "lex/scanner.h"
@@ -9,6 +10,7 @@
 #include "text/output_policy.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
+#include "text/trace.h"
 #include "translator/reader/qrex_parser.h"
 #include "translator/symbols/name_space.h"
 #include "workspace/workspace.h"
@@ -104,15 +106,34 @@ ScannedFile::~ScannedFile() = default;
 
 std::string ScannedFile::SourcePath() const { return file.project->SourcePath(file); }
 
+namespace {
+
+// Where an import may stand in the tree, in the order of the search.
+std::array<std::string, 4> ImportCandidates(const ProjectFile& importer, const std::string& path) {
+  const size_t slash = importer.path.rfind('/');
+  const std::string directory = slash == std::string::npos ? std::string() : importer.path.substr(0, slash);
+  const Project& project = *importer.project;
+  return {PathJoin(directory, path), path, PathJoin(project.rootToProjDir, path), PathJoin(project.sourceDir, path)};
+}
+
+}  // namespace
+
 ProjectFile* ScannedFile::ResolveImport(const std::string& path) const {
-  const size_t slash = file.path.rfind('/');
-  const std::string directory = slash == std::string::npos ? std::string() : file.path.substr(0, slash);
-  const Project& project = *file.project;
-  for (const std::string& candidate :
-       {PathJoin(directory, path), path, PathJoin(project.rootToProjDir, path), PathJoin(project.sourceDir, path)}) {
+  for (const std::string& candidate : ImportCandidates(file, path)) {
     if (ProjectFile* found = host.FindFile(candidate)) return found;
   }
   return nullptr;
+}
+
+std::string ScannedFile::ImportHint(const std::string& path) const {
+  if (ResolveImport(path)) return {};  // it failed for another reason
+  std::string text = "no project lists ";
+  const auto candidates = ImportCandidates(file, path);
+  for (auto candidate = candidates.begin(); candidate != candidates.end(); ++candidate) {
+    if (std::find(candidates.begin(), candidate, *candidate) != candidate) continue;
+    text += (candidate == candidates.begin() ? "" : " or ") + *candidate;
+  }
+  return text;
 }
 
 bool ScannedFile::Import(LSFrame&, const std::string& path, const char*) {
@@ -159,7 +180,7 @@ void ScannedFile::WriteGeneratedFile() {
 void ScannedFile::WriteTranslation(const std::string& target) {
   const int64_t readTime = CurrentFileTime();
   if (!LoadText(sourceText, SourcePath(), true)) {
-    throw LexScannerException("Couldn't open file " + SourcePath(), nullptr);
+    throw LexScannerException("Couldn't open file " + SourcePath(), nullptr).WithHint(file.project->ListingHint(file));
   }
   registerNames.clear();
   unregisterNames.clear();
@@ -218,6 +239,7 @@ bool ScannedFile::CopySource(const std::string& target) const {
     const SystemException failure;
     TraceWriter() << "ERROR: Copy file " << SourcePath() << " to " << target << " failed\n";
     ReportSystemError(failure);
+    TraceWriter() << Hint(file.project->ListingHint(file));
     return false;
   }
   TouchFile(target, false);

@@ -64,6 +64,7 @@ class ScannedFile : public ImportHandler {
   void WriteGeneratedFile();
   bool Import(LSFrame& frame, const std::string& path, const char* position) override;
   ProjectFile* ResolveImport(const std::string& path) const;  // or null
+  std::string ImportHint(const std::string& path) const override;
   std::string SourcePath() const;
   // The source position of a 1-based line of the generated text; false (with a message to `trace`) when there is none.
   bool MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const;

@@ -1,0 +1,85 @@
+// The keys of a configuration file, each with the field that it sets and what `Qrex --help` says of it.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "driver/config_settings.h"
+
+namespace qrex {
+
+template <typename Field>
+struct ConfigKey {
+  std::string_view word;
+  Field field;
+  std::string_view help;
+};
+
+inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
+    {"config", &ConfigSettings::config, "the configuration to build, as projects name it"},
+    {"platform", &ConfigSettings::platform, "its platform"},
+    {"systemName", &ConfigSettings::systemName, "@system_name; \"Windows\" also exports from dynamic libraries"},
+    {"systemProcessor", &ConfigSettings::systemProcessor, "@system_processor"},
+    {"systemVersion", &ConfigSettings::systemVersion, "@system_version"},
+    {"sizeofPointer", &ConfigSettings::sizeofPointer, "@size_of_pointer"},
+};
+
+inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
+    {"targetXP", &ConfigSettings::targetXP, "the _xp tool sets in .vcxproj files"},
+    {"defaultToDll", &ConfigSettings::defaultToDll, "the target type Library is a dynamic library, else a static one"},
+    {"diagnostics", &ConfigSettings::diagnostics, "tell what is stale and which commands run"},
+    {"translateOnly", &ConfigSettings::translateOnly, "run no tools; needs no PATH, INCLUDE, LIB"},
+    {"rebuildAll", &ConfigSettings::rebuildAll, "take everything for stale"},
+    {"exportPublicHeaders", &ConfigSettings::exportPublicHeaders, "copy public headers to the export directories"},
+    {"repackageExecutableTargets", &ConfigSettings::repackageExecutableTargets,
+     "copy targets of projects marked export to $EXPORT_LIB"},
+    {"solutionContainsPrepackagedProjects", &ConfigSettings::solutionContainsPrepackagedProjects,
+     "list projects marked export in the .sln"},
+    {"makeTranslatedFilesReadOnly", &ConfigSettings::makeTranslatedFilesReadOnly, "protect translated files"},
+    {"makeExportedHeaderFilesReadOnly", &ConfigSettings::makeExportedHeaderFilesReadOnly, "protect exported headers"},
+    {"writeTokenEquivalent", &ConfigSettings::writeTokenEquivalent,
+     "also write a translation that differs in blanks and comments alone"},
+};
+
+inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kListKeys[] = {
+    {"virtualTree", &ConfigSettings::virtualTree, "the roots under which workspaces, projects and sources are found"},
+    {"workspaces", &ConfigSettings::workspaces, "workspace files and single projects, by their path below a root"},
+};
+
+inline constexpr ConfigKey<std::string PlatformEnvironment::*> kEnvironmentKeys[] = {
+    {"PATH", &PlatformEnvironment::PATH, "where tools are found, for one platform"},
+    {"INCLUDE", &PlatformEnvironment::INCLUDE, "what they see as INCLUDE; asked for by every compiler"},
+    {"LIB", &PlatformEnvironment::LIB, "what they see as LIB; asked for by every compiler"},
+};
+
+inline constexpr ConfigKey<std::string ConfigSettings::*> kPathVariables[] = {
+    {"EXPORT_LIB", &ConfigSettings::exportLib, "the folder of built targets"},
+    {"EXPORT_TRANSLATED_INCLUDE", &ConfigSettings::exportTranslatedInclude,
+     "the folder of exported translated headers"},
+    {"EXPORT_UNTRANSLATED_INCLUDE", &ConfigSettings::exportUntranslatedInclude,
+     "the folder of exported headers as written"},
+};
+
+struct ModeWord {
+  std::string_view word;
+  std::string_view help;
+};
+inline constexpr ModeWord kModes[] = {
+    // by RunMode
+    {"clean", "delete translated files and dependency files"},
+    {"compile", "translate and compile one file, $COMPILE_FILE_PATH"},
+    {"build", "translate what is stale, compile and link"},
+    {"gen", "write the project files of the compiler"},
+    {"show", "print where the translation of $COMPILE_FILE_PATH stands"},
+};
+
+inline std::string CompilerWords() {
+  std::string words;
+  for (int i = 0; i <= static_cast<int>(CompilerKind::clang); ++i) {
+    words.append(i > 0 ? " " : "").append(CompilerKeyword(static_cast<CompilerKind>(i)));
+  }
+  return words;
+}
+
+}  // namespace qrex

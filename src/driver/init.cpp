@@ -1,0 +1,120 @@
+#include "driver/init.h"
+
+#include <algorithm>
+#include <vector>
+
+#include "platform/file_system.h"
+#include "platform/system.h"
+#include "text/files.h"
+#include "text/numbers.h"
+#include "text/paths.h"
+#include "text/trace.h"
+
+namespace qrex {
+
+namespace {
+
+// In the names and the texts of templates.
+constexpr char kNameInPaths[] = "NAME";
+constexpr char kNameInTexts[] = "{{NAME}}";
+constexpr char kRuntimeInTexts[] = "{{RUNTIME}}";
+constexpr char kHiddenName[] = "dot.";  // begins the name of a file that is to begin with a dot
+constexpr char kTemplates[] = "templates/workspace";
+constexpr char kRuntime[] = "runtime";
+
+bool Complain(const std::string& message) {
+  WriteToConsole("Error: " + message + "\n");
+  return false;
+}
+
+// It names files, projects and what is generated for them.
+bool IsIdentifier(const std::string& name) {
+  const auto isLetter = [](char c) { return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || c == '_'; };
+  const auto isDigit = [](char c) { return c >= '0' && c <= '9'; };
+  return !name.empty() && isLetter(name.front()) &&
+         std::all_of(name.begin(), name.end(), [&](char c) { return isLetter(c) || isDigit(c); });
+}
+
+// The folder that holds templates and runtime: beside the program, around it (a build folder in the sources), or where
+// an installation puts them.
+bool FindData(std::string& data) {
+  const std::string program = platform::ProgramPath();
+  const std::string folder = program.substr(0, program.rfind('/'));
+  std::string tried;
+  for (const char* place : {".", "..", "../share/qrex"}) {
+    const std::string candidate = folder + "/" + place;
+    platform::FileInfo templates, runtime;
+    if (platform::Stat(candidate + "/" + kTemplates, templates) &&
+        platform::Stat(candidate + "/" + kRuntime, runtime)) {
+      return RealPathOf(candidate, data);
+    }
+    tried += "\n    " + candidate;
+  }
+  return Complain("No " + std::string(kTemplates) + " and " + kRuntime + " in any of" + tried);
+}
+
+struct LaidOutFile {
+  std::string path;
+  std::string text;
+};
+
+class Layout {
+ public:
+  Layout(const std::string& name, const std::string& folder, const std::string& data)
+      : m_name(name), m_runtime(data + "/" + kRuntime) {
+    Add(data + "/" + kTemplates, folder);
+  }
+  const std::vector<LaidOutFile>& Files() const { return m_files; }
+
+ private:
+  void Add(const std::string& from, const std::string& to) {
+    FileOrDirIterator entries(from + "/*");
+    while (const IFileOrDirInfo* entry = entries.Next()) {
+      const std::string source = entry->Name();
+      if (source == "." || source == "..") continue;
+      const std::string target = to + "/" + TargetName(source);
+      if (entry->IsDirectory()) {
+        Add(from + "/" + source, target);
+        continue;
+      }
+      LaidOutFile& file = m_files.emplace_back();
+      file.path = target;
+      if (!ReadWholeFile(file.text, from + "/" + source)) throw FileException(from + "/" + source);
+      ReplaceAllInPlace(file.text, kNameInTexts, m_name);
+      ReplaceAllInPlace(file.text, kRuntimeInTexts, m_runtime);
+    }
+  }
+
+  std::string TargetName(std::string name) const {
+    if (name.starts_with(kHiddenName)) name.erase(0, sizeof kHiddenName - 2);
+    ReplaceAllInPlace(name, kNameInPaths, m_name);
+    return name;
+  }
+
+  std::string m_name;
+  std::string m_runtime;
+  std::vector<LaidOutFile> m_files;
+};
+
+}  // namespace
+
+bool InitWorkspace(const std::string& name, const std::string& folder) {
+  if (!IsIdentifier(name)) return Complain(name + " can't name a workspace: letters, digits and _, a letter first");
+  std::string data;
+  if (!FindData(data)) return false;
+  const Layout layout(name, folder, data);
+  for (const LaidOutFile& file : layout.Files()) {
+    platform::FileInfo there;
+    if (platform::Stat(file.path, there)) return Complain(file.path + " is there already; nothing was written");
+  }
+  for (const LaidOutFile& file : layout.Files()) {
+    CreateDirectories(file.path, false);
+    ReplaceFile(file.path, file.text);
+    WriteToConsole(file.path + "\n");
+  }
+  WriteToConsole("\nTo build and run it:\n    cd " + folder + "\n    Qrex " + name + ".qrex\n    out/lib/x64/Debug/" +
+                 name + "_app\n");
+  return true;
+}
+
+}  // namespace qrex

@@ -1,0 +1,129 @@
+#!/usr/bin/env python3
+"""Hints: what a terminal shows behind a message, on a line of its own, and a pipe or a file does not."""
+
+import os
+import pty
+import re
+import subprocess
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, Workspace, equal, need, run_tests  # noqa: E402
+
+PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n%s\n{\n    "src"\n    {\n        %s\n    }\n}\n'
+FILES = {
+    "main.qrex": SETTINGS.replace('"tree"', '"tree" "more"') + "translateOnly = true\n",
+    "tree/.qrwsroot": "",
+    "tree/all.qrws": '"all" { "core" "app" "tool" }\n',
+    "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "qrex", '"core.cpp"'),
+    "tree/core/src/core.cpp": "int core() { return 0; }\n",
+    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" } qrex', '"app.cpp"'),
+    "tree/app/src/app.cpp": "int core();\nint main() { return core(); }\n",
+    "tree/tool/src/tool.qrpj": PROJECT % ("Console Application", "tool", "qrex", '"tool.cpp"'),
+    "tree/tool/src/tool.cpp": "int main() {}\n",
+}
+HERE = " (relative paths begin in the folder where Qrex runs)"
+
+
+def on_terminal(command, folder):
+    """What the command writes to a terminal."""
+    terminal, its_end = pty.openpty()
+    process = subprocess.Popen(command, cwd=folder, stdin=its_end, stdout=its_end, stderr=its_end)
+    os.close(its_end)
+    output = b""
+    while True:
+        try:
+            part = os.read(terminal, 65536)
+        except OSError:  # the last writer has closed it
+            break
+        if not part:
+            break
+        output += part
+    os.close(terminal)
+    process.wait(timeout=60)
+    return output.decode().replace("\r\n", "\n")
+
+
+def comparable(text, folder):
+    """Without what differs from run to run."""
+    return re.sub(r"\.+ +[0-9.]+ ms$", "", text.replace(str(folder), "FOLDER"), flags=re.MULTILINE)
+
+
+def hints_of(binary, changes, *arguments):
+    """The hints of a run on a terminal. Its other lines are all that a pipe and a file get."""
+    def run(how):
+        files = {name: text for name, text in {**FILES, **changes}.items() if text is not None}
+        with Workspace(binary, files) as workspace:
+            command = [binary, "main.qrex", *arguments]
+            if how == "terminal":
+                return comparable(on_terminal(command, workspace.folder), workspace.folder)
+            with open(workspace.path("output"), "wb") as file:
+                target = subprocess.PIPE if how == "pipe" else file
+                done = subprocess.run(command, cwd=workspace.folder, stdout=target, stderr=subprocess.STDOUT, timeout=60)
+            output = done.stdout if how == "pipe" else workspace.path("output").read_bytes()
+            return comparable(output.decode(), workspace.folder)
+    lines = run("terminal").splitlines(keepends=True)
+    plain = "".join(line for line in lines if not line.startswith("    hint: "))
+    for how in ("pipe", "file"):
+        equal(run(how), plain)
+    return [line.removeprefix("    hint: ").rstrip("\n") for line in lines if line.startswith("    hint: ")]
+
+
+def no_message_no_hint(binary):
+    equal(hints_of(binary, {}), [])
+
+
+def a_workspace_or_project_that_is_not_found(binary):
+    equal(hints_of(binary, {"tree/all.qrws": None}), ["not found as tree/all.qrws, more/all.qrws" + HERE])
+    equal(hints_of(binary, {"tree/all.qrws": '"all" { "deep/other.qrws" }'}),
+          ["not found as tree/deep/other.qrws, more/deep/other.qrws" + HERE])
+    equal(hints_of(binary, {"tree/all.qrws": '"all" { "cor" }'}),
+          ["not found as tree/cor/src/cor.qrpj, more/cor/src/cor.qrpj" + HERE])
+
+
+def a_source_that_is_missing(binary):
+    listed = "app/src/app.cpp is listed in tree/app/src/app.qrpj(8)"
+    equal(hints_of(binary, {"tree/app/src/app.cpp": None}), [listed, "the run ends here and leaves out: tool"])
+    equal(hints_of(binary, {"tree/app/src/app.cpp": None}, "mode=gen"), [listed])
+
+
+def an_import_that_is_not_found(binary):
+    equal(hints_of(binary, {"tree/tool/src/tool.cpp": '@import "core.h"\n'}),
+          ["no project lists tool/src/core.h or core.h or tool/core.h"])
+    equal(hints_of(binary, {"tree/all.qrws": '@import "x.inc"\n"all" { }'}),
+          ["not found as x.inc, tree/x.inc, more/x.inc" + HERE])
+
+
+def an_invalid_word(binary):
+    equal(hints_of(binary, {"main.qrex": "mode = biuld"}), ["one of clean compile build gen show"])
+    equal(hints_of(binary, {"main.qrex": "compiler = g++"}), ["one of vc6 vc8 vc9 vc10 vc11 vc12 vc14 gcc winegcc clang"])
+    equal(hints_of(binary, {"main.qrex": "moed = build"}), ["no statement begins so; Qrex --help lists the keys"])
+    equal(hints_of(binary, {"tree/tool/src/tool.qrpj": PROJECT % ("Utility Project", "tool", "", '"tool.cpp" : exlude')}),
+          ["an option of a file is one of exclude, +cpp, -cpp"])
+
+
+def a_configuration_that_a_project_lacks(binary):
+    equal(hints_of(binary, {}, 'config="Fast"'),
+          ["tree/core/src/core.qrpj has Debug|x64", "the run ends here and leaves out: app tool"])
+
+
+def a_line_of_the_command_line(binary):
+    where = "this line is none of the file, it stands on the command line: "
+    equal(hints_of(binary, {}, "rebuildAll=true", "mode=biuld"),
+          ["one of clean compile build gen show", where + "mode=biuld"])
+    equal(hints_of(binary, {}, "mode="), ["one of clean compile build gen show", where + "mode="])
+    equal(hints_of(binary, {}, "@fail(\"no\")"), [where + "@fail(\"no\")"])
+
+
+def a_library_that_this_program_does_not_build(binary):
+    need("g++")
+    changes = {"tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "", '"core.cpp"'),
+               "tree/all.qrws": '"all" { "core" "app" }\n'}
+    equal(hints_of(binary, changes, "translateOnly=false"),
+          ["tree/core/src/core.qrpj does not say qrex: this program does not build core, which app links against"])
+
+
+run_tests([no_message_no_hint, a_workspace_or_project_that_is_not_found, a_source_that_is_missing,
+           an_import_that_is_not_found, an_invalid_word, a_configuration_that_a_project_lacks, a_line_of_the_command_line,
+           a_library_that_this_program_does_not_build])

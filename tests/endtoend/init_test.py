@@ -1,0 +1,101 @@
+#!/usr/bin/env python3
+"""What the first argument may ask for in place of a run: a new workspace, which builds and runs, help and the release."""
+
+import os
+import re
+import shutil
+import subprocess
+import sys
+import xml.etree.ElementTree as XmlTree
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+
+ROOT = Path(__file__).resolve().parents[2]
+COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
+
+
+def contents(folder):
+    return {str(path.relative_to(folder)): path.read_bytes() for path in folder.rglob("*") if path.is_file()}
+
+
+def untracked(workspace, folder):
+    """What .gitignore does not name, of the files that came after `git add`."""
+    return workspace.shell(f"cd {folder} && git ls-files --others --exclude-standard" if shutil.which("git") else "true")
+
+
+@in_workspace({}, "g++")
+def the_first_hour(workspace):
+    laid_out = workspace.shell("Qrex --init zoo")
+    equal(sorted(laid_out.split("\n\n")[0].splitlines()), sorted(f"zoo/{name}" for name in contents(workspace.path("zoo"))))
+    workspace.shell("cd zoo && git init -q . && git add -A" if shutil.which("git") else "true")
+    output = workspace.shell("cd zoo && Qrex zoo.qrex && out/lib/x64/Debug/zoo_app")
+    holds(output, "Completed.", 'animals::Animal ["kept here"]\n', "    string8 name = Leo\n",
+          "    animals::Diet diet = Meat\n", "    eats 3.8 kg a day\n", "animals::Diet: Plants Meat Anything\n",
+          "Leo had 4.5 kg, as release 1 tells\n")
+    lacks(output, "warning")
+    equal(untracked(workspace, "zoo"), "")
+
+
+@in_workspace({})
+def every_compiler_reads_the_same_files(workspace):
+    workspace.run("--init", "zoo", ".")
+    workspace.shell("git init -q . && git add -A" if shutil.which("git") else "true")
+    for compiler in COMPILERS:
+        for arguments in (["mode=gen"], ["translateOnly=true"]):
+            holds(workspace.run("zoo.qrex", f"compiler={compiler}", *arguments), "Completed.")
+        for path in workspace.folder.iterdir():
+            if path.suffix in {".vcproj", ".vcxproj", ".filters", ".cbp", ".workspace"}:
+                XmlTree.parse(path)
+    holds(workspace.run("zoo.translate.qrex", "mode=gen"), "Completed.")
+    holds(workspace.path("build_zoo.sln").read_text(encoding="utf-8-sig"), "zoo_core", "zoo_app")
+    equal(untracked(workspace, "."), "")
+
+
+@in_workspace({})
+def nothing_is_overwritten(workspace):
+    workspace.write("zoo/tree/common.inc", "mine\n")
+    output = workspace.run("--init", "zoo", status=1)
+    equal(output, "Error: zoo/tree/common.inc is there already; nothing was written\n")
+    equal(contents(workspace.folder), {"zoo/tree/common.inc": b"mine\n"})
+    for name in ("", "1a", "a-b", "a/b", "ä"):
+        holds(workspace.run("--init", name, status=1), "can't name a workspace")
+    for arguments in ((), ("a", "b", "c")):
+        equal(workspace.run("--init", *arguments, status=1), "Usage: Qrex --init NAME [FOLDER]\n")
+    equal(contents(workspace.folder), {"zoo/tree/common.inc": b"mine\n"})
+
+
+@in_workspace({})
+def templates_are_found_where_an_installation_puts_them(workspace):
+    for folder, data in (("beside", "beside"), ("installed/bin", "installed/share/qrex")):
+        os.makedirs(workspace.path(folder), exist_ok=True)
+        shutil.copy(workspace.binary, workspace.path(folder))
+        for part in ("templates", "runtime"):
+            shutil.copytree(ROOT / part, workspace.path(data) / part)
+        os.symlink(workspace.path(folder) / "Qrex", workspace.path("link"))
+        subprocess.run([workspace.path("link"), "--init", "w", f"of/{folder}"], cwd=workspace.folder, check=True,
+                       stdout=subprocess.DEVNULL)
+        workspace.path("link").unlink()
+        holds(workspace.path(f"of/{folder}/settings.inc").read_text(), f'"{workspace.path(data).resolve()}/runtime"')
+    shutil.copy(workspace.binary, workspace.path("alone"))
+    done = subprocess.run([workspace.path("alone"), "--init", "w"], cwd=workspace.folder, capture_output=True, text=True)
+    equal(done.returncode, 1)
+    holds(done.stdout, "Error: No templates/workspace and runtime in any of\n")
+
+
+@in_workspace({"--help": ""})
+def help_and_release(workspace):
+    version = re.search(r"project\(Qrex VERSION (\S+)", (ROOT / "CMakeLists.txt").read_text()).group(1)
+    equal(workspace.run("--version"), f"Qrex {version}\n")
+    output = workspace.run("--help")
+    holds(output, version, "--init NAME [FOLDER]", "mode = WORD", "  build ", "the default", "  compiler = vc8 ",
+          "  defaultToDll = true ", "  diagnostics = false ", "  $EXPORT_LIB = ")
+    equal([line for line in output.splitlines() if len(line) > 120], [])
+    # Behind an assignment it is a file like any other.
+    holds(workspace.run('a="b"', "--version", status=1), "Exception: Couldn't open file --version")
+    holds(workspace.run("--versions", status=1), "Exception: Couldn't open file --versions")
+
+
+run_tests([the_first_hour, every_compiler_reads_the_same_files, nothing_is_overwritten,
+           templates_are_found_where_an_installation_puts_them, help_and_release])

@@ -1,0 +1,64 @@
+#!/usr/bin/env python3
+"""Does what docs/tutorial.md says, in its order: writes its files, types its commands, and looks for what they print."""
+
+import os
+import re
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import equal, holds, in_workspace, run_tests  # noqa: E402
+
+PAGE = Path(__file__).resolve().parents[2] / "docs/tutorial.md"
+FILE = re.compile(r"(?:^|.*\. )`([^`]+)`:$")  # ahead of a block: its name
+
+
+def blocks(text):
+    """The indented blocks of a page, each with the last line of text ahead of it."""
+    ahead, block = "", []
+    for line in text.splitlines() + ["end"]:
+        if line.startswith("    ") or (block and not line):
+            block.append(line[4:])
+            continue
+        if block:
+            yield ahead, "\n".join(block).rstrip("\n") + "\n"
+            block = []
+        if line:
+            ahead = line
+
+
+def commands(block):
+    """The lines behind a `$`, each with what is shown of its output."""
+    for part in re.split(r"^\$ ", block, flags=re.MULTILINE)[1:]:
+        command, *output = part.splitlines()
+        yield command, output
+
+
+def follow(workspace, text):
+    """Follows the page; how many files it wrote and how many commands it ran."""
+    files = typed = 0
+    folder = "."
+    for ahead, block in blocks(text):
+        name = FILE.match(ahead)
+        if name:
+            workspace.write(os.path.join(folder, name.group(1)), block)
+            files += 1
+            continue
+        for command, output in commands(block):
+            printed = workspace.shell(f"cd {folder} && {command}")
+            if command.startswith("cd "):
+                folder = os.path.join(folder, command[3:])
+            holds(printed, *output)
+            typed += 1
+    return files, typed
+
+
+@in_workspace({}, "g++", "make")
+def the_tutorial(workspace):
+    text = PAGE.read_text()
+    files, typed = follow(workspace, text)
+    equal(files, len(re.findall(r"`:$", text, flags=re.MULTILINE)))
+    equal(typed, len(re.findall(r"^    \$ ", text, flags=re.MULTILINE)))
+
+
+run_tests([the_tutorial])
