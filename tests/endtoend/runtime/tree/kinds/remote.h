@@ -22,12 +22,18 @@ $class+ Calc isa ICalc
 {
 public:
     void Add(int32 a, const vesk::string8& b, int32& sum) { sum = a + int32(b.size()); }
-    void Swap(vesk::string8& a, int32& b) const { a += "!"; b = -b; }
+    void Swap(vesk::string8& a, int32& b) const
+    {
+        if (onSwap) onSwap(a);
+        a += "!";
+        b = -b;
+    }
     void Notify(int32 n) { notified += n; }
     void Ping() { ++notified; }
     void Take(Size* size) { notified += size->width; delete size; }
     void Vectors(const vesk::xvector<int32>& in, vesk::xvector<int32>& out) { out = in; out.push_back(1); }
     int32 notified = 0;
+    std::function<void(vesk::string8&)> onSwap;
 };
 
 }

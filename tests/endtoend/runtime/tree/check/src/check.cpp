@@ -10,6 +10,9 @@ void CheckArchives();
 void CheckSchemas();
 void CheckChanges();
 void CheckRemote();
+void CheckRemoteErrors();
+void CheckRemoteMessages();
+void CheckRemoteAnswers();
 void CheckGraph();
 void CheckCaches();
 void CheckVisiting();
@@ -18,7 +21,8 @@ int main()
 {
     Register_Project_check();
     for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
-                       CheckRemote, CheckGraph, CheckCaches, CheckVisiting})
+                       CheckRemote, CheckRemoteErrors, CheckRemoteMessages, CheckRemoteAnswers, CheckGraph, CheckCaches,
+                       CheckVisiting})
     {
         check();
     }
