@@ -13,6 +13,10 @@ void CheckRemote();
 void CheckRemoteErrors();
 void CheckRemoteMessages();
 void CheckRemoteAnswers();
+void CheckJsonBothWays();
+void CheckJsonErrors();
+void CheckJsonObjects();
+void CheckAccess();
 void CheckGraph();
 void CheckCaches();
 void CheckVisiting();
@@ -21,8 +25,8 @@ int main()
 {
     Register_Project_check();
     for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
-                       CheckRemote, CheckRemoteErrors, CheckRemoteMessages, CheckRemoteAnswers, CheckGraph, CheckCaches,
-                       CheckVisiting})
+                       CheckRemote, CheckRemoteErrors, CheckRemoteMessages, CheckRemoteAnswers, CheckJsonBothWays,
+                       CheckJsonErrors, CheckJsonObjects, CheckAccess, CheckGraph, CheckCaches, CheckVisiting})
     {
         check();
     }
