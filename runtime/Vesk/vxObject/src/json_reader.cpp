@@ -27,6 +27,7 @@ class JsonReader {
       if (hasObjects) ExpectNext("$value");
       Get(type, address);
       if (hasObjects) m_scanner.Expect('}');
+      CheckReached();
     } catch (...) {
       Forget(type, address);
       throw;
@@ -339,11 +340,11 @@ class JsonReader {
       m_scanner.SkipValue();
     });
     m_scanner.GoTo(list);
-    std::size_t number = 0;
-    EachElement([this, &number] {
-      const Object object = m_objects[number++];
+    EachElement([this] {
+      const Object object = m_objects[m_reader++];
       GetFields(m_types.Of(*object.m_record), object.m_self, true);
     });
+    m_reader = 0;
     return true;
   }
 
@@ -397,6 +398,25 @@ class JsonReader {
     }
     if (!any.m_self) m_scanner.FailAt(at, xstring(object.m_record->m_name) + " is no " + type.m_target);
     SetReference(type, reference, any);
+    m_references.push_back({m_reader, number});
+  }
+  // An object that the value does not lead to would be nobody's.
+  void CheckReached() {
+    std::sort(m_references.begin(), m_references.end());
+    xvector<bool> reached(m_objects.size() + 1);
+    xvector<std::size_t> pending = {0};
+    while (!pending.empty()) {
+      const std::size_t from = pending.back();
+      pending.pop_back();
+      auto at = std::lower_bound(m_references.begin(), m_references.end(), std::make_pair(from, std::size_t(0)));
+      for (; at != m_references.end() && at->first == from; ++at) {
+        if (!reached[at->second]) pending.push_back(at->second);
+        reached[at->second] = true;
+      }
+    }
+    for (std::size_t number = 1; number <= m_objects.size(); ++number) {
+      if (!reached[number]) m_scanner.Fail(vxMakeString("object " << number << " is not reached from the value"));
+    }
   }
   static void SetReference(ValueType const& type, void* reference, AnyInterface any) {
     if (type.m_code == RC_CREF) {
@@ -432,6 +452,8 @@ class JsonReader {
   JsonLimits const& m_limits;
   std::size_t m_memory = 0;
   xvector<Object> m_objects;
+  std::size_t m_reader = 0;  // the object that is read, by number; 0 for the value
+  xvector<std::pair<std::size_t, std::size_t>> m_references;  // who leads to what
 };
 
 }  // namespace
