@@ -3,7 +3,9 @@
 @import "json_scalars.h"
 
 #include <charconv>
-#include <cmath>
+#include <limits>
+#include <locale>
+#include <sstream>
 
 namespace vesk {
 
@@ -16,6 +18,34 @@ void SetBits(void* address, std::size_t size, uint128 value) {
   if (size == 4) return set(static_cast<uint32>(value));
   if (size == 8) return set(static_cast<uint64>(value));
   set(value);
+}
+
+// False for a number that is no F: too large, or too small.
+template <typename F>
+bool ParseFloat(std::string_view text, F& value) {
+#ifdef __cpp_lib_to_chars
+  return std::from_chars(text.data(), text.data() + text.size(), value).ec == std::errc();
+#else
+  std::istringstream stream{std::string(text)};
+  stream.imbue(std::locale::classic());
+  return static_cast<bool>(stream >> value);
+#endif
+}
+
+// Whether a number that is out of range is so because of its size: its first digit stands before the point.
+bool IsLarge(std::string_view text) {
+  const std::size_t e = std::min(text.find_first_of("eE"), text.size());
+  int64 exponent = 0;
+  if (e < text.size()) {
+    std::string_view digits = text.substr(e + 1);
+    if (digits[0] == '+') digits.remove_prefix(1);
+    const bool isNegative = digits[0] == '-';
+    const auto result = std::from_chars(digits.data(), digits.data() + digits.size(), exponent);
+    if (result.ec != std::errc()) return !isNegative;
+  }
+  const std::size_t first = std::min(text.find_first_of("123456789"), e);
+  const std::size_t point = std::min(text.find('.'), e);
+  return static_cast<int64>(point) - static_cast<int64>(first) + exponent > 0;
 }
 
 template <typename F>
@@ -33,16 +63,12 @@ void ReadFloat(JsonScanner& scanner, F& value) {
     return;
   }
   const std::string_view text = scanner.ReadNumber();
-  F read;
-  const auto result = std::from_chars(text.data(), text.data() + text.size(), read);
-  if (result.ec == std::errc() && !std::isinf(read)) {
-    value = read;
-    return;
+  F read = 0;
+  if (!ParseFloat(text, read)) {
+    if (IsLarge(text)) scanner.FailAt(at, "out of range");
+    read = 0;
   }
-  // Too small is 0; too large is no number.
-  const float64 wide = std::strtod(std::string(text).c_str(), nullptr);
-  if (std::abs(wide) >= 1) scanner.FailAt(at, "out of range");
-  value = static_cast<F>(wide);
+  value = read;
 }
 
 }  // namespace

@@ -214,7 +214,11 @@ void CheckJsonErrors()
     CHECK(Read<vesk::string8>("\"\\ud83d\\ude00\\/\\u0041\""), "\"😀/A\"");
     CHECK(Json(vesk::string8("\xff")), "string is not UTF-8");
     CHECK(Read<vesk::float64>("1e999"), "line 1, column 1: out of range");
-    CHECK(Read<vesk::float64>("1e-999"), "0");
+    for (auto text : {"1e-999", "0.0001e-330", "0.1e-99999999999999999999"}) CHECK(Read<vesk::float64>(text), "0");
+    for (auto text : {"100000e305", "1e99999999999999999999", "-1e+309"})
+    {
+        CHECK(Read<vesk::float64>(text), "line 1, column 1: out of range");
+    }
     CHECK(Read<vesk::float32>("1e39"), "line 1, column 1: out of range");
     CHECK(Read<vesk::float64>("\"-Infinity\""), "\"-Infinity\"");
     CHECK(Read<vesk::float64>("\"NaN\""), "\"NaN\"");
