@@ -10,8 +10,6 @@
 
 @import "Vesk/vxObject/TypeNames.h"
 
-
-
 namespace vesk {
 
 class AccessError : public std::runtime_error {
@@ -132,10 +130,10 @@ struct MethodCall<R(Args...)> {
     typedef std::remove_const_t<C> Class;
     if (method->m_isConst) {
       return reinterpret_cast<R(__stdcall*)(Class const*, Args...)>(method->m_function)(object,
-                                                                                       static_cast<Args>(args)...);
+                                                                                        static_cast<Args>(args)...);
     }
     return reinterpret_cast<R(__stdcall*)(Class*, Args...)>(method->m_function)(const_cast<Class*>(object),
-                                                                               static_cast<Args>(args)...);
+                                                                                static_cast<Args>(args)...);
   }
 };
 

@@ -1,7 +1,7 @@
 // Values and objects as JSON, both ways, by their records alone (see Access.h for what has a value).
 //
 //   bool                      true, false
-//   integers to 32 bits       numbers; those of 64 and 128 bits strings of digits, as many readers of JSON keep 53 bits.
+//   integers to 32 bits       numbers; those of 64 and 128 bits strings of digits: many readers keep 53 bits.
 //                             Either is read as either; a fraction or a number out of range is refused
 //   float32, float64          the shortest number that reads back the same; "NaN", "Infinity", "-Infinity"
 //   char8, char16             a string of one character; a number where the byte or unit is none by itself
@@ -18,12 +18,12 @@
 //   pref, cref                null, or {"$ref": 2}, the second object of the text
 //   anything else             has no member. null as an element, which is left as it is when it is read
 //
-// A text with objects is {"$objects": [{"$class": "a::Doc", ...}, ...], "$value": ...}: the objects that the value leads
-// to, each once, in a flat list, so that cycles and long chains are no trouble. A `$dep` field is calculated and not
-// written. What is read is changed field by field: after an error the fields before it have their new values.
+// A text with objects is {"$objects": [{"$class": "a::Doc", ...}, ...], "$value": ...}: the objects that the value
+// leads to, each once, in a flat list, so that cycles and long chains are no trouble. A `$dep` field is calculated and
+// not written. What is read is changed field by field: after an error the fields before it have their new values.
 //
-// A reader trusts nothing: the text is checked whole before anything is changed, the limits hold for it, and objects are
-// made only of registered classes that the reference may lead to and that `m_allow` admits.
+// A reader trusts nothing: the text is checked whole before anything is changed, the limits hold for it, and objects
+// are made only of registered classes that the reference may lead to and that `m_allow` admits.
 
 @import "Vesk/vxObject/Access.h"
 
@@ -48,7 +48,7 @@ struct JsonLimits {
   std::size_t m_bytes = std::size_t(64) << 20;    // of the text
   std::size_t m_memory = std::size_t(256) << 20;  // of the elements and objects that it makes
   int m_depth = kJsonDepth;
-  bool m_ignoreUnknown = false;                   // members that no field has
+  bool m_ignoreUnknown = false;                        // members that no field has
   std::function<bool(ReflectedClass const&)> m_allow;  // classes that objects may be made of; empty: all registered
 };
 

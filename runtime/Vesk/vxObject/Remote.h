@@ -1,7 +1,7 @@
 // Remote calls over a channel of bytes. A stub marshals a call into a message: the object's number, the method's index,
 // the number of the answer or 0, and the arguments. On the other side a skeleton (or a scion) unmarshals it, calls the
-// object and, where the caller waits for out parameters, sends an answer: the number, 0 and the values, or the number, 1
-// and what went wrong. Calls without out parameters wait in the channel until someone serves it.
+// object and, where the caller waits for out parameters, sends an answer: the number, 0 and the values, or the number,
+// 1 and what went wrong. Calls without out parameters wait in the channel until someone serves it.
 //
 // Neither side trusts the other. A message that cannot be read, names nothing that is exported, has bytes behind its
 // arguments or makes the method throw is answered with its error, and the server serves on; an answer is written to

@@ -96,13 +96,12 @@ class SocketChannel : public Channel {
     void StartRead() {
       if (m_isReading || !m_socket.is_open() || m_inBytes > m_limit) return;
       m_isReading = true;
-      m_socket.async_read_some(
-          boost::asio::buffer(m_buffer),
-          [self = shared_from_this()](boost::system::error_code const& error, std::size_t size) {
-            self->m_isReading = false;
-            if (error || !self->Append(size)) return self->Close();
-            self->StartRead();
-          });
+      m_socket.async_read_some(boost::asio::buffer(m_buffer),
+                               [self = shared_from_this()](boost::system::error_code const& error, std::size_t size) {
+                                 self->m_isReading = false;
+                                 if (error || !self->Append(size)) return self->Close();
+                                 self->StartRead();
+                               });
     }
     // The memory for a message grows with what has come of it. False for one that is too long.
     bool Append(std::size_t size) {
@@ -141,14 +140,13 @@ class SocketChannel : public Channel {
       if (m_out.size() == 1) StartWrite();
     }
     void StartWrite() {
-      boost::asio::async_write(
-          m_socket, boost::asio::buffer(m_out.front().data(), m_out.front().size()),
-          [self = shared_from_this()](boost::system::error_code const& error, std::size_t) {
-            self->m_outBytes -= self->m_out.front().size();
-            self->m_out.pop_front();
-            if (error) return self->Close();
-            if (!self->m_out.empty()) self->StartWrite();
-          });
+      boost::asio::async_write(m_socket, boost::asio::buffer(m_out.front().data(), m_out.front().size()),
+                               [self = shared_from_this()](boost::system::error_code const& error, std::size_t) {
+                                 self->m_outBytes -= self->m_out.front().size();
+                                 self->m_out.pop_front();
+                                 if (error) return self->Close();
+                                 if (!self->m_out.empty()) self->StartWrite();
+                               });
     }
 
     static constexpr std::size_t kLengthBytes = 4;

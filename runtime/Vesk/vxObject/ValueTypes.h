@@ -2,9 +2,9 @@
 // done with a value that only its type tells: make, destroy and compare it, and walk and fill containers.
 //
 // The containers of one kind are laid out alike whatever they hold, as far as code that touches no element can see: a
-// vector is a vector of bytes in steps of the element's size, the nodes of a list or tree are links and room behind them.
-// So one container of stand-in elements serves as the view of all of its kind, and no container needs to be registered
-// or pays for being walked.
+// vector is a vector of bytes in steps of the element's size, the nodes of a list or tree are links and room behind
+// them. So one container of stand-in elements serves as the view of all of its kind, and no container needs to be
+// registered or pays for being walked.
 
 @import "Vesk/vxObject/Access.h"
 
@@ -25,10 +25,10 @@ struct ValueType {
   xstring m_text;
   std::size_t m_size = 0;  // 0 for a type without values
   std::size_t m_align = 1;
-  ssize_t m_count = 0;                   // of a fixed array
-  ValueType const* m_key = nullptr;      // of a map
-  ValueType const* m_item = nullptr;     // of a container: its elements, a map's values
-  TypeOps const* m_ops = nullptr;        // of a scalar, a string, a class, a variant
+  ssize_t m_count = 0;                // of a fixed array
+  ValueType const* m_key = nullptr;   // of a map
+  ValueType const* m_item = nullptr;  // of a container: its elements, a map's values
+  TypeOps const* m_ops = nullptr;     // of a scalar, a string, a class, a variant
   ReflectedClass const* m_class = nullptr;
   ReflectedEnum const* m_enum = nullptr;
   ReflectedVariant const* m_variant = nullptr;
@@ -73,7 +73,8 @@ bool LessValue(ValueType const& type, void const* a, void const* b);
 // A value of its own.
 class HeldValue {
  public:
-  explicit HeldValue(ValueType const& type) : m_type(type), m_memory(::operator new(std::max<std::size_t>(type.m_size, 1))) {
+  explicit HeldValue(ValueType const& type)
+      : m_type(type), m_memory(::operator new(std::max<std::size_t>(type.m_size, 1))) {
     try {
       MakeValue(type, m_memory);
     } catch (...) {

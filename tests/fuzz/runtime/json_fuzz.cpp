@@ -75,9 +75,13 @@ void ReadObjects(std::string_view text) {
 }
 
 using Read = void (*)(std::string_view);
-const Read kKinds[] = {ReadAndWrite<kinds::Reflected>,       ReadAndWrite<kinds::Everything>,
-                       ReadAndWrite<kinds::Value>,           ReadAndWrite<kinds::Tree>,
-                       ReadAndWrite<vesk::xvector<kinds::Part>>, ReadAndWrite<kinds::Doc>, ReadObjects};
+const Read kKinds[] = {ReadAndWrite<kinds::Reflected>,
+                       ReadAndWrite<kinds::Everything>,
+                       ReadAndWrite<kinds::Value>,
+                       ReadAndWrite<kinds::Tree>,
+                       ReadAndWrite<vesk::xvector<kinds::Part>>,
+                       ReadAndWrite<kinds::Doc>,
+                       ReadObjects};
 constexpr std::size_t kKindCount = sizeof(kKinds) / sizeof(*kKinds);
 
 std::vector<std::string> Seeds() {

@@ -50,7 +50,8 @@ class JsonReader {
   }
   void ExpectName(std::string_view name) {
     const std::size_t at = m_scanner.Here();
-    if (m_scanner.Peek() != '"' || m_scanner.ReadString8() != name) m_scanner.FailAt(at, "expected " + std::string(name));
+    const bool isName = m_scanner.Peek() == '"' && m_scanner.ReadString8() == name;
+    if (!isName) m_scanner.FailAt(at, "expected " + std::string(name));
     m_scanner.Expect(':');
   }
   void ExpectNext(std::string_view name) {
@@ -89,7 +90,8 @@ class JsonReader {
       case VK_UINT:
         return ReadJsonInteger(m_scanner, type, address);
       case VK_FLOAT:
-        return type.m_size == 4 ? ReadJsonFloat(m_scanner, *static_cast<float32*>(address)) : ReadJsonFloat(m_scanner, *static_cast<float64*>(address));
+        return type.m_size == 4 ? ReadJsonFloat(m_scanner, *static_cast<float32*>(address))
+                                : ReadJsonFloat(m_scanner, *static_cast<float64*>(address));
       case VK_CHAR:
         return ReadJsonChar(m_scanner, type, address);
       case VK_TEXT:
@@ -192,7 +194,8 @@ class JsonReader {
         *static_cast<bool*>(key) = name == "true";
         return;
       case VK_ENUM:
-        return SetJsonEnum(m_scanner, type, *static_cast<int32*>(key), name, name.find_first_not_of("-0123456789") != std::string::npos, at);
+        return SetJsonEnum(m_scanner, type, *static_cast<int32*>(key), name,
+                           name.find_first_not_of("-0123456789") != std::string::npos, at);
       default:
         return SetJsonInteger(m_scanner, type, key, name, at);
     }
@@ -252,6 +255,7 @@ class JsonReader {
     if (type && type->m_code == RC_VOID) {
       if (!m_scanner.AcceptNull()) m_scanner.Fail("expected null");
     } else if (type) {
+      CheckNoReferences(m_types, *type);
       const HeldValue value(*type);
       Get(*type, value.Get());
       WriteValue(ar, *type, value.Get());
@@ -431,11 +435,13 @@ class JsonReader {
     if (m_objects.empty()) return;
     if (type.m_kind == VK_REFERENCE) {
       void* const self = *static_cast<void**>(address);
-      const bool goes = std::any_of(m_objects.begin(), m_objects.end(), [self](Object const& o) { return o.m_self == self; });
+      const bool goes =
+          std::any_of(m_objects.begin(), m_objects.end(), [self](Object const& o) { return o.m_self == self; });
       if (goes) SetReference(type, address, AnyInterface());
     } else if (type.m_kind == VK_CLASS) {
       for (ValueField const& field : m_types.FieldsOf(type)) {
-        if (!IndepNodeAt(*type.m_class, address, field)) Forget(*field.m_type, static_cast<octet_t*>(address) + field.m_offset);
+        void* const at = static_cast<octet_t*>(address) + field.m_offset;
+        if (!IndepNodeAt(*type.m_class, address, field)) Forget(*field.m_type, at);
       }
     } else if (type.m_kind == VK_SET || (type.m_key && type.m_key->m_kind == VK_REFERENCE)) {
       ClearContainer(type, address);

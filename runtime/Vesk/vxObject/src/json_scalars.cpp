@@ -133,7 +133,8 @@ void ReadJsonEnum(JsonScanner& scanner, ValueType const& type, int32& value) {
   SetJsonEnum(scanner, type, value, isText ? scanner.ReadString8() : std::string(scanner.ReadNumber()), isText, at);
 }
 
-void SetJsonEnum(JsonScanner& scanner, ValueType const& type, int32& value, std::string const& text, bool isLabel, std::size_t at) {
+void SetJsonEnum(JsonScanner& scanner, ValueType const& type, int32& value, std::string const& text, bool isLabel,
+                 std::size_t at) {
   ReflectedEnum const* record = type.m_enum;
   for (ssize_t i = 0; record && i < record->m_numLabels; ++i) {
     const int32 number = record->m_values ? record->m_values[i] : static_cast<int32>(i);

@@ -129,7 +129,8 @@ std::u16string JsonScanner::ReadString16() {
     if (c != '\\') {
       const std::size_t length = Utf8Length(m_text.substr(m_position));
       uint32 point = length == 1 ? c : static_cast<octet_t>(c) & (0x7F >> length);
-      for (std::size_t i = 1; i < length; ++i) point = point << 6 | (static_cast<octet_t>(m_text[m_position + i]) & 0x3F);
+      for (std::size_t i = 1; i < length; ++i)
+        point = point << 6 | (static_cast<octet_t>(m_text[m_position + i]) & 0x3F);
       m_position += length;
       if (point >= 0x10000) text += static_cast<char16>(0xD7C0 + (point >> 10));
       text += static_cast<char16>(point >= 0x10000 ? 0xDC00 | (point & 0x3FF) : point);

@@ -26,7 +26,8 @@ void PutEscape(std::string& out, uint32 unit) {
 }
 
 void PutAscii(std::string& out, char c) {
-  static constexpr char escapes[][2] = {{'"', '"'}, {'\\', '\\'}, {'\b', 'b'}, {'\f', 'f'}, {'\n', 'n'}, {'\r', 'r'}, {'\t', 't'}};
+  static constexpr char escapes[][2] = {{'"', '"'},  {'\\', '\\'}, {'\b', 'b'}, {'\f', 'f'},
+                                        {'\n', 'n'}, {'\r', 'r'},  {'\t', 't'}};
   for (auto const& escape : escapes) {
     if (c != escape[0]) continue;
     out += '\\';
@@ -40,7 +41,9 @@ void PutAscii(std::string& out, char c) {
   }
 }
 
-bool IsPlain(char c) { return static_cast<octet_t>(c) >= 0x20 && c != '"' && c != '\\' && static_cast<octet_t>(c) < 0x7F; }
+bool IsPlain(char c) {
+  return static_cast<octet_t>(c) >= 0x20 && c != '"' && c != '\\' && static_cast<octet_t>(c) < 0x7F;
+}
 
 }  // namespace
 
@@ -99,6 +102,32 @@ ValueType const* JsonTypeOfName(ValueTypes& types, xstring const& name) {
   if (Find<ReflectedClass>(name)) return &types.Of(NamedType(RC_CLASS, name.c_str()));
   if (Find<ReflectedVariant>(name)) return &types.Of(NamedType(RC_VARIANT, name.c_str()));
   return nullptr;
+}
+
+namespace {
+
+bool HasReferences(ValueTypes& types, ValueType const& type, xset<ValueType const*>& seen) {
+  if (type.m_kind == VK_REFERENCE) return true;
+  if (!seen.Insert(&type)) return false;
+  if (type.m_key && HasReferences(types, *type.m_key, seen)) return true;
+  if (type.m_item && HasReferences(types, *type.m_item, seen)) return true;
+  if (type.m_kind == VK_CLASS) {
+    for (ValueField const& field : types.FieldsOf(type)) {
+      if (HasReferences(types, *field.m_type, seen)) return true;
+    }
+  }
+  for (ssize_t i = 0; type.m_variant && i < type.m_variant->m_numItems; ++i) {
+    ValueType const* item = types.ItemOf(*type.m_variant, i);
+    if (item && HasReferences(types, *item, seen)) return true;
+  }
+  return false;
+}
+
+}  // namespace
+
+void CheckNoReferences(ValueTypes& types, ValueType const& type) {
+  xset<ValueType const*> seen;
+  if (HasReferences(types, type, seen)) throw JsonError("references in a variant: " + type.m_text);
 }
 
 ptr<IObject> JsonObjectOf(xstring interface, AnyInterface any) {

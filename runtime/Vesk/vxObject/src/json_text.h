@@ -20,6 +20,8 @@ bool IsJsonKey(ValueType const& type);
 std::string_view JsonItemName(std::string_view name);
 // The type that an openvariant's archive names; null for one that only its operations know.
 ValueType const* JsonTypeOfName(ValueTypes& types, xstring const& name);
+// An item's archive stands by itself: JsonError for a type that refers to objects.
+void CheckNoReferences(ValueTypes& types, ValueType const& type);
 // An interface handle as the object that it is. JsonError for an interface that does not begin with IObject.
 ptr<IObject> JsonObjectOf(xstring interface, AnyInterface any);
 

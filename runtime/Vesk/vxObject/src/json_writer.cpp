@@ -142,8 +142,11 @@ class JsonWriter {
   }
 
   void PutText(ValueType const& type, void* address) {
-    if (type.m_code == RC_STRING8) return PutJsonString(m_text, *static_cast<string8*>(address), m_style.m_replaceInvalid);
-    PutJsonString(m_text, std::u16string_view(*static_cast<string16*>(address)));
+    if (type.m_code == RC_STRING8) {
+      PutJsonString(m_text, *static_cast<string8*>(address), m_style.m_replaceInvalid);
+    } else {
+      PutJsonString(m_text, std::u16string_view(*static_cast<string16*>(address)));
+    }
   }
 
   void PutEnum(ValueType const& type, int32 number) {
@@ -192,7 +195,8 @@ class JsonWriter {
   // What is no string by itself is put in quotes.
   void PutKey(ValueType const& type, void* key) {
     if (type.m_kind == VK_TEXT) {
-      const std::string text = type.m_code == RC_STRING8 ? *static_cast<string8*>(key) : Utf8Text(*static_cast<string16*>(key));
+      const std::string text =
+          type.m_code == RC_STRING8 ? *static_cast<string8*>(key) : Utf8Text(*static_cast<string16*>(key));
       return PutJsonString(m_text, (text.empty() || text[0] != '$' ? "" : "$") + text, m_style.m_replaceInvalid);
     }
     const std::size_t begin = m_text.size();
@@ -254,6 +258,7 @@ class JsonWriter {
     if (type && type->m_code == RC_VOID) {
       m_text += "null";
     } else if (type) {
+      CheckNoReferences(m_types, *type);
       const HeldValue value(*type);
       ReadValue(ar, *type, value.Get());
       Put(*type, value.Get());
@@ -320,7 +325,12 @@ class JsonWriter {
 }  // namespace
 
 xstring ToJson(Value const& value, JsonStyle const& style) {
-  return JsonWriter(*value.Types(), style).Write(value.Type(), value.Address());
+  ValueType const& type = value.Type();
+  try {
+    return JsonWriter(*value.Types(), style).Write(type, value.Address());
+  } catch (ArchiveError const& error) {  // of a variant
+    throw JsonError(error.what());
+  }
 }
 
 }  // namespace vesk

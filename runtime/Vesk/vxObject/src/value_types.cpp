@@ -295,7 +295,8 @@ void ReadValue(InputArchive& ar, ValueType const& type, void* address) {
   }
   ClearContainer(type, address);
   for (ssize_t i = 0; i < count; ++i) {
-    void* entry = InsertEntry(type, address, [&](void* key) { ReadValue(ar, type.m_key ? *type.m_key : *type.m_item, key); });
+    void* entry =
+        InsertEntry(type, address, [&](void* key) { ReadValue(ar, type.m_key ? *type.m_key : *type.m_item, key); });
     if (!entry) throw ArchiveError("repeated key");
     if (type.m_key) ReadValue(ar, *type.m_item, type.ItemOf(entry));
   }

@@ -242,6 +242,9 @@ void CheckJsonErrors()
           "line 1, column 1: read beyond the end of an archive");
     CHECK(Read<vesk::openvariant<int32>>(Q("{'$type':'nobody','$value':{'$bytes':''}}")),
           "line 1, column 1: type of an openvariant is not registered: nobody");
+    CHECK(Read<vesk::openvariant<int32>>(Q("{'$type':'kinds::Everything','$value':{}}")),
+          "references in a variant: kinds::Everything");
+    CHECK(Json(vesk::openvariant<int32>(vesk::xlist<int32>{1})), "type of an openvariant is not registered");
     // Limits.
     CHECK(Read<Tree>(std::string(200000, '[')), "line 1, column 101: nested too deeply");
     vesk::JsonLimits limits;
@@ -323,7 +326,7 @@ void CheckJsonObjects()
     CHECK(refused(shared + Q("{'$class':'kinds::Nobody'}")), "line 1, column 39: no class to create: kinds::Nobody");
     CHECK(refused(shared + Q("{'$class':'kinds::Calc'}")), "line 1, column 39: class is not allowed: kinds::Calc");
     CHECK(refused(shared + Q("{'$class':'kinds::Doc'},{'$class':'kinds::Doc','next':{'$ref':3}}")),
-          "line 1, column 180: object 3 is not reached from the value");
+          "line 1, column 164: object 3 is not reached from the value");
     CHECK(refused(Q("{'$class':'kinds::Doc'},{}")), "line 1, column 39: expected $class");
     CHECK(refused(Q("{'$class':'kinds::Doc'},{'$class':'kinds::Doc'}")),
           "line 1, column 82: kinds::Doc is no kinds::Part");
