@@ -3,12 +3,13 @@
 programs: by the tool itself and by make. The same sources and descriptions serve every compiler."""
 
 import shutil
+import subprocess
 import sys
 import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import Skipped, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
 
 ROOT = Path(__file__).resolve().parents[2]
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
@@ -90,8 +91,30 @@ def make_builds_them(binary):
                 equal([path for top in ("x64", "out/lib") for path in workspace.path(top).rglob("*") if path.is_file()], [])
 
 
+def processes_call_each_other(binary):
+    """A server and two clients, each a process of its own."""
+    need("g++")
+    asio = subprocess.run(["g++", "-E", "-x", "c++", "-include", "boost/asio.hpp", "/dev/null"], capture_output=True)
+    if asio.returncode != 0:
+        raise Skipped("boost/asio.hpp")
+    with copy(binary, "remote") as workspace:
+        holds(workspace.run("remote.qrex"), "Completed.")
+        output = workspace.shell("""
+            board=out/lib/x64/Debug/board
+            $board serve port 2 > server.txt & server=$!
+            $board post port Ada hello again > ada.txt & ada=$!
+            $board post port Ben "" bye > ben.txt & ben=$!
+            wait $ada && wait $ben && wait $server && cat ada.txt ben.txt server.txt""")
+        holds(output, "Ada has 2 notes on the board\n",
+              "Ben was refused: an empty note\nBen has 1 notes on the board\nrefused: an empty note\n",
+              '"author": "Ben",\n      "text": "bye"\n')
+        equal(output.count('"author": "Ada"'), 2)
+        # Nobody listens any more.
+        holds(workspace.shell("out/lib/x64/Debug/board post port Cy late", status=1), "board: cannot connect to 127.0.0.1: ")
+
+
 def one_description_serves_every_compiler(binary):
-    for folder, name, program, _ in EXAMPLES:
+    for folder, name, program, _ in EXAMPLES + [("remote", "remote", "board", "")]:
         with copy(binary, folder) as workspace:
             for compiler in COMPILERS:
                 for arguments in (["mode=gen"], ["translateOnly=true", "rebuildAll=true"]):
@@ -114,4 +137,4 @@ def one_description_serves_every_compiler(binary):
                     lacks(text, "ar rcs")
 
 
-run_tests([a_run_builds_them, make_builds_them, one_description_serves_every_compiler])
+run_tests([a_run_builds_them, make_builds_them, processes_call_each_other, one_description_serves_every_compiler])

@@ -88,29 +88,39 @@ class DynArray {
     std::copy(items.begin(), items.end(), begin());
   }
   DynArray(DynArray const& rhs) : DynArray(rhs.m_size) { std::copy(rhs.begin(), rhs.end(), begin()); }
-  DynArray(DynArray&& rhs) : m_size(std::exchange(rhs.m_size, 0)), m_items(std::move(rhs.m_items)) {}
+  DynArray(DynArray&& rhs) noexcept { swap(rhs); }
   DynArray& operator=(DynArray rhs) {
-    std::swap(m_size, rhs.m_size);
-    m_items.swap(rhs.m_items);
+    swap(rhs);
     return *this;
   }
+  ~DynArray() {
+    std::destroy_n(m_items, m_size);
+    if (m_items) std::allocator<T>().deallocate(m_items, static_cast<std::size_t>(m_size));
+  }
+  void swap(DynArray& rhs) noexcept {
+    std::swap(m_size, rhs.m_size);
+    std::swap(m_items, rhs.m_items);
+  }
   void resize(ssize_t size) {
-    std::unique_ptr<T[]> items(new T[size]());
-    std::move(begin(), begin() + std::min(size, m_size), items.get());
-    m_items.swap(items);
-    m_size = size;
+    DynArray items;
+    if (size > 0) items.m_items = std::allocator<T>().allocate(static_cast<std::size_t>(size));
+    std::uninitialized_value_construct_n(items.m_items, size);
+    items.m_size = size;
+    std::move(begin(), begin() + std::min(size, m_size), items.begin());
+    swap(items);
   }
   ssize_t size() const { return m_size; }
   T& operator[](ssize_t i) { return m_items[i]; }
   T const& operator[](ssize_t i) const { return m_items[i]; }
-  T* begin() { return m_items.get(); }
-  T* end() { return m_items.get() + m_size; }
-  T const* begin() const { return m_items.get(); }
-  T const* end() const { return m_items.get() + m_size; }
+  T* begin() { return m_items; }
+  T* end() { return m_items + m_size; }
+  T const* begin() const { return m_items; }
+  T const* end() const { return m_items + m_size; }
 
  private:
+  friend struct DynArrayView;
   ssize_t m_size = 0;
-  std::unique_ptr<T[]> m_items;
+  T* m_items = nullptr;
 };
 
 // What the containers share: comparison of the two arrays, and printing of them all as [a,b,c].

@@ -215,10 +215,39 @@ class DGDepNode : public DGNode {
   explicit DGDepNode(int flags = DF_SYNC_DEP) : DGNode(flags) {}
 };
 
+// Tells the node of an `$indep` field from whatever else a record may place at an address: a value that belongs to its
+// own place.
+class IndepMark {
+ public:
+  IndepMark() {}
+  IndepMark(IndepMark const&) {}
+  IndepMark& operator=(IndepMark const&) { return *this; }
+
+ protected:
+  static bool StandsAt(void const* address) {
+    std::uintptr_t value;
+    std::memcpy(&value, address, sizeof(value));
+    return value == Of(address);
+  }
+
+ private:
+  static std::uintptr_t Of(void const* address) {
+    return reinterpret_cast<std::uintptr_t>(address) ^ static_cast<std::uintptr_t>(0x9E3779B97F4A7C15);
+  }
+  std::uintptr_t m_value = Of(this);
+};
+
 // The node of an `$indep` field: always up to date, and told of changes.
-class DGIndepNode : public DGNode {
+class DGIndepNode : public DGNode, private IndepMark {
  public:
   void OnChange() { InvalidateDependents(true); }
+
+  // The node at an address where anything may stand, with room for a node; null when it is no node.
+  static DGIndepNode* At(void* address) {
+    if (reinterpret_cast<std::uintptr_t>(address) % alignof(DGIndepNode) != 0) return nullptr;
+    DGIndepNode* const node = static_cast<DGIndepNode*>(address);
+    return IndepMark::StandsAt(static_cast<IndepMark*>(node)) ? node : nullptr;
+  }
 };
 
 // --- Values that nodes keep

@@ -1,54 +1,23 @@
 // Remote calls over a channel of bytes. A stub marshals a call into a message: the object's number, the method's index,
 // the number of the answer or 0, and the arguments. On the other side a skeleton (or a scion) unmarshals it, calls the
-// object and, where the caller waits for out parameters, sends a message back. Calls without out parameters wait in the
-// channel until someone serves it. Both ends live in this process; a transport of one's own derives from Channel.
+// object and, where the caller waits for out parameters, sends an answer: the number, 0 and the values, or the number,
+// 1 and what went wrong. Calls without out parameters wait in the channel until someone serves it.
+//
+// Neither side trusts the other. A message that cannot be read, names nothing that is exported, has bytes behind its
+// arguments or makes the method throw is answered with its error, and the server serves on; an answer is written to
+// the caller's parameters only while the call that asked for it is under way. What both ends share is a Channel:
+// LocalChannel in one process, SocketChannel.h between processes, or a class of one's own. A connection, a server and
+// what they call belong to one thread.
 
+@import "Vesk/vxObject/Channel.h"
 @import "Vesk/vxObject/Persist.h"
 
 #include <unordered_map>
 
 namespace vesk {
 
-class Channel {
- public:
-  virtual ~Channel() {}
-  virtual void Send(xvector<octet_t> const& message) = 0;
-  // False when nothing waits.
-  virtual bool Receive(xvector<octet_t>& message) = 0;
-};
-
-// Two ends of a queue in each direction.
-class LocalChannel {
- public:
-  LocalChannel() : m_ends{End(m_queues[0], m_queues[1]), End(m_queues[1], m_queues[0])} {}
-  Channel& Client() { return m_ends[0]; }
-  Channel& Server() { return m_ends[1]; }
-
- private:
-  typedef xdeque<xvector<octet_t>> Queue;
-  class End : public Channel {
-   public:
-    End(Queue& out, Queue& in) : m_out(out), m_in(in) {}
-    void Send(xvector<octet_t> const& message) override { m_out.push_back(message); }
-    bool Receive(xvector<octet_t>& message) override {
-      if (m_in.empty()) return false;
-      message = std::move(m_in.front());
-      m_in.pop_front();
-      return true;
-    }
-
-   private:
-    Queue& m_out;
-    Queue& m_in;
-  };
-  Queue m_queues[2];
-  End m_ends[2];
-};
-
-class RemoteError : public std::runtime_error {
- public:
-  using std::runtime_error::runtime_error;
-};
+// What the first byte behind an answer's number says.
+enum EAnswer { AN_VALUES, AN_ERROR };
 
 // --- Client
 
@@ -68,37 +37,93 @@ struct QueuedResponse : PendingResponse {
 
 class ClientConnection {
  public:
-  // `serve`: lets the other side work while a call waits for its answer.
-  ClientConnection(Channel& channel, std::function<void()> serve) : m_channel(channel), m_serve(std::move(serve)) {}
+  // `serve`: lets the other side work while a call waits for its answer; empty where it works by itself.
+  ClientConnection(Channel& channel, std::function<void()> serve = nullptr)
+      : m_channel(channel), m_serve(std::move(serve)) {}
 
-  uint32 Expect(PendingResponse* response) {
-    m_pending[++m_lastAnswer].reset(response);
-    return m_lastAnswer;
+  // How long a call waits for its answer in a channel that can wait: 30 seconds unless told otherwise.
+  void SetTimeout(std::chrono::milliseconds timeout) { m_timeout = timeout; }
+  void SetMessageLimit(std::size_t bytes) { m_messageLimit = bytes; }
+
+  // The number for the next call that waits.
+  uint32 NextAnswer() { return ++m_lastAnswer != 0 ? m_lastAnswer : ++m_lastAnswer; }
+  void Send(Archive const& message) {
+    CheckMessageSize(message.m_bytes.size(), m_messageLimit);
+    m_channel.Send(message.m_bytes);
   }
-  void Send(Archive const& message) { m_channel.Send(message.m_bytes); }
-  void AwaitAnswer(uint32 answer) {
-    m_serve();
-    xvector<octet_t> message;
-    while (m_pending.count(answer) > 0 && m_channel.Receive(message)) Dispatch(message);
-    if (m_pending.erase(answer) > 0) throw RemoteError("remote call without an answer");
+  // Sends a call and waits for its answer, whose values `response` takes. Whatever way the call ends, no later answer
+  // finds the response.
+  void Call(Archive const& message, uint32 answer, PendingResponse& response) {
+    Pending pending(*this, answer, response);
+    Send(message);
+    if (m_serve) m_serve();
+    const auto end = std::chrono::steady_clock::now() + m_timeout;
+    xvector<octet_t> bytes;
+    while (!pending.m_isDone) {
+      const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
+      if (!m_channel.ReceiveWithin(bytes, std::max(left, std::chrono::milliseconds(0)))) {
+        if (!m_channel.IsOpen()) throw ChannelClosed("the other side is gone");
+        throw RemoteTimeout("remote call without an answer");
+      }
+      Dispatch(bytes);
+    }
+    if (!pending.m_error.empty()) throw RemoteError(pending.m_error);
   }
 
  private:
+  // A call under way.
+  struct Pending {
+    Pending(ClientConnection& connection, uint32 answer, PendingResponse& response)
+        : m_connection(connection), m_answer(answer), m_response(response) {
+      connection.m_pending[answer] = this;
+    }
+    ~Pending() { m_connection.m_pending.erase(m_answer); }
+    Pending(Pending const&) = delete;
+    void operator=(Pending const&) = delete;
+
+    ClientConnection& m_connection;
+    uint32 m_answer;
+    PendingResponse& m_response;
+    bool m_isDone = false;
+    std::string m_error;
+  };
+
+  // An answer that nobody waits for any more is dropped.
   void Dispatch(xvector<octet_t> const& message) {
+    CheckMessageSize(message.size(), m_messageLimit);
+    if (message.empty()) throw RemoteError("empty message");
     InputArchive ar(message);
     uint32 answer;
     DeserialiseVariableLengthUint(ar, answer);
     const auto at = m_pending.find(answer);
-    if (at == m_pending.end()) throw RemoteError("unexpected answer");
-    const std::unique_ptr<PendingResponse> response = std::move(at->second);
-    m_pending.erase(at);
-    response->m_fn(ar, response->OutParams());
+    if (at == m_pending.end()) return;
+    Pending& pending = *at->second;
+    pending.m_isDone = true;
+    try {
+      ReadAnswer(ar, pending);
+    } catch (std::exception const& error) {
+      pending.m_error = std::string("bad answer: ") + error.what();
+    }
+  }
+  static void ReadAnswer(InputArchive& ar, Pending& pending) {
+    octet_t kind;
+    ar.Read(&kind, 1);
+    if (kind == AN_VALUES) {
+      pending.m_response.m_fn(ar, pending.m_response.OutParams());
+    } else {
+      xstring error;
+      ar >> error;
+      pending.m_error = error.empty() ? "remote call failed" : error;
+    }
+    if (ar.Remaining() > 0) throw RemoteError("bytes behind the values");
   }
 
   Channel& m_channel;
   std::function<void()> m_serve;
+  std::chrono::milliseconds m_timeout = std::chrono::seconds(30);
+  std::size_t m_messageLimit = kMessageLimit;
   uint32 m_lastAnswer = 0;
-  std::unordered_map<uint32, std::unique_ptr<PendingResponse>> m_pending;
+  std::unordered_map<uint32, Pending*> m_pending;
 };
 
 template <typename I>
@@ -131,17 +156,26 @@ class Stub {
   void DestroyObject() { delete this; }
 
  protected:
+  // The response is the stub's from here on.
   Archive& StubBegin(ssize_t method, PendingResponse* response) const {
+    m_response.reset(response);
+    if (!m_connection) throw RemoteError("stub without a connection");
     m_message = Archive();
-    m_answer = response ? m_connection->Expect(response) : 0;
+    m_answer = response ? m_connection->NextAnswer() : 0;
     SerialiseVariableLengthUint(m_message, m_object);
     SerialiseVariableLengthUint(m_message, method);
     SerialiseVariableLengthUint(m_message, m_answer);
     return m_message;
   }
+  // A call may lead to another one through this stub while it waits.
   void StubEnd() const {
-    m_connection->Send(m_message);
-    if (m_answer) m_connection->AwaitAnswer(m_answer);
+    const Archive message = std::move(m_message);
+    const std::unique_ptr<PendingResponse> response = std::move(m_response);
+    if (response) {
+      m_connection->Call(message, m_answer, *response);
+    } else {
+      m_connection->Send(message);
+    }
   }
 
  private:
@@ -151,6 +185,7 @@ class Stub {
   uint32 m_object = 0;
   mutable Archive m_message;
   mutable uint32 m_answer = 0;
+  mutable std::unique_ptr<PendingResponse> m_response;
 };
 
 // --- Server
@@ -162,27 +197,76 @@ typedef ThunkFn ScionThunkFn;
 // Unmarshals the calls of one object.
 class Dispatcher {
  public:
-  Dispatcher(ThunkFn const* thunks, ssize_t count) : m_thunks(thunks), m_count(count) {}
+  Dispatcher(ThunkFn const* thunks, ssize_t count) : m_delegate{{this}, nullptr}, m_thunks(thunks), m_count(count) {}
   virtual ~Dispatcher() {}
+  Dispatcher(Dispatcher const&) = delete;
+  void operator=(Dispatcher const&) = delete;
 
-  void SetDelegate(AnyInterface delegate) { m_delegate = delegate; }
-  // The values that go back.
+  void SetDelegate(AnyInterface delegate) {
+    m_object = delegate.m_self;
+    m_delegate.m_table = delegate.m_table;
+  }
+  // The values that go back. A call may lead to another one of the same object.
   Archive Call(void* self, ssize_t method, InputArchive arguments) {
     if (method < 0 || method >= m_count) throw RemoteError("no such remote method");
-    m_arguments = std::move(arguments);
-    m_results = Archive();
+    const Scope scope(*this, std::move(arguments));
     m_thunks[method](self);
     return std::move(m_results);
   }
 
  protected:
-  InputArchive Pop() { return std::move(m_arguments); }
+  // Reads the arguments, which stay with the dispatcher.
+  class Arguments {
+   public:
+    explicit Arguments(InputArchive& archive) : m_archive(archive) {}
+    template <typename T>
+    Arguments& operator>>(T& value) {
+      m_archive >> value;
+      return *this;
+    }
+
+   private:
+    InputArchive& m_archive;
+  };
+  // The object. A thunk asks for it when it has read the arguments, just before it calls: nothing may be left then.
+  struct Object {
+    Dispatcher* m_dispatcher;
+    operator void*() const {
+      if (m_dispatcher->m_arguments.Remaining() > 0) throw RemoteError("bytes behind the arguments");
+      return m_dispatcher->m_object;
+    }
+  };
+  struct Delegate {
+    Object m_self;
+    void const* m_table;
+  };
+
+  Arguments Pop() { return Arguments(m_arguments); }
   Archive& Push() { return m_results; }
-  AnyInterface m_delegate;
+  Delegate m_delegate;
 
  private:
+  // The call that is carried out; the one around it goes on with what is its own.
+  struct Scope {
+    Scope(Dispatcher& dispatcher, InputArchive arguments)
+        : m_dispatcher(dispatcher),
+          m_arguments(std::exchange(dispatcher.m_arguments, std::move(arguments))),
+          m_results(std::exchange(dispatcher.m_results, Archive())) {}
+    ~Scope() {
+      m_dispatcher.m_arguments = std::move(m_arguments);
+      m_dispatcher.m_results = std::move(m_results);
+    }
+    Scope(Scope const&) = delete;
+    void operator=(Scope const&) = delete;
+
+    Dispatcher& m_dispatcher;
+    InputArchive m_arguments;
+    Archive m_results;
+  };
+
   ThunkFn const* m_thunks;
   ssize_t m_count;
+  void* m_object = nullptr;
   InputArchive m_arguments;
   Archive m_results;
 };
@@ -234,56 +318,108 @@ Factory& FactoryOf(ConstStringZ name) {
   return *at->second;
 }
 
-// The objects that the other side may call, by number.
+// The objects that the other side may call, by number. A number is not given out again.
 class Server {
  public:
+  typedef std::function<void(std::string const&)> ErrorFunction;
   explicit Server(Channel& channel) : m_channel(channel) {}
 
+  // The object must live until it is taken back. RemoteError for null and for an interface that is not registered.
   template <typename I>
   uint32 Export(ptr<I> const& object) {
-    m_objects.emplace_back();
-    Exported& exported = m_objects.back();
+    if (!object) throw RemoteError("null cannot be exported");
+    Exported exported;
     if constexpr (InterfaceTypeTraits<I>::is_rmi) {
       Skeleton* skeleton = FactoryOf<ISkeletonFactory>(GetIpcInterfaceName<I>()).CreateSkeleton();
-      exported = {std::unique_ptr<Dispatcher>(skeleton), skeleton};
+      exported = {std::shared_ptr<Dispatcher>(skeleton), skeleton};
     } else {
       Scion* scion = FactoryOf<IScionFactory>(GetIpcInterfaceName<I>()).CreateScion();
-      exported = {std::unique_ptr<Dispatcher>(scion), scion};
+      exported = {std::shared_ptr<Dispatcher>(scion), scion};
     }
     exported.m_dispatcher->SetDelegate(object.Any());
-    return static_cast<uint32>(m_objects.size());
+    m_objects[++m_lastNumber] = std::move(exported);
+    return m_lastNumber;
   }
+  // Takes an object back: later calls of it are errors. False for a number that is not exported.
+  bool Unexport(uint32 number) { return m_objects.erase(number) > 0; }
 
-  // Carries out what waits in the channel.
-  void Serve() {
-    xvector<octet_t> message;
-    while (m_channel.Receive(message)) Dispatch(message);
+  void SetMessageLimit(std::size_t bytes) { m_messageLimit = bytes; }
+  // Is told each error, also those that go back to a caller.
+  void OnError(ErrorFunction function) { m_onError = std::move(function); }
+
+  // Carries out what waits in the channel. What a method throws, a bad message and a client that is gone do not come
+  // out of here.
+  void Serve() { ServeWithin(std::chrono::milliseconds(0)); }
+  // The same, and waits for the first message up to `time`. False once the channel is closed.
+  bool ServeWithin(std::chrono::milliseconds time) {
+    try {
+      xvector<octet_t> message;
+      if (!(time.count() > 0 ? m_channel.ReceiveWithin(message, time) : m_channel.Receive(message))) {
+        return m_channel.IsOpen();
+      }
+      do Dispatch(message);
+      while (m_channel.Receive(message));
+    } catch (std::exception const& error) {
+      Report(error.what());
+    }
+    return m_channel.IsOpen();
   }
 
  private:
   struct Exported {
-    std::unique_ptr<Dispatcher> m_dispatcher;
-    void* m_self = nullptr;  // as its thunks see it
+    std::shared_ptr<Dispatcher> m_dispatcher;  // an object may be taken back by its own method
+    void* m_self = nullptr;                    // as its thunks see it
   };
 
+  // Throws only where the answer cannot be sent.
   void Dispatch(xvector<octet_t> const& message) {
+    uint32 answer = 0;
+    Archive reply;
+    try {
+      const Archive results = Carry(message, answer);
+      if (!answer) return;
+      SerialiseVariableLengthUint(reply, answer);
+      reply << octet_t(AN_VALUES);
+      reply.Write(results.m_bytes.data(), results.m_bytes.size());
+      CheckMessageSize(reply.m_bytes.size(), m_messageLimit);
+    } catch (std::exception const& error) {
+      reply = ErrorReply(answer, error.what());
+    } catch (...) {
+      reply = ErrorReply(answer, "remote method failed");
+    }
+    if (answer) m_channel.Send(reply.m_bytes);
+  }
+
+  Archive Carry(xvector<octet_t> const& message, uint32& answer) {
     InputArchive ar(message);
-    uint32 object, method, answer;
+    uint32 object, method, number;
     DeserialiseVariableLengthUint(ar, object);
     DeserialiseVariableLengthUint(ar, method);
-    DeserialiseVariableLengthUint(ar, answer);
-    if (object == 0 || object > m_objects.size()) throw RemoteError("no such remote object");
-    Exported& exported = m_objects[object - 1];
-    const Archive results = exported.m_dispatcher->Call(exported.m_self, method, std::move(ar));
-    if (!answer) return;
+    DeserialiseVariableLengthUint(ar, number);
+    answer = number;
+    CheckMessageSize(message.size(), m_messageLimit);
+    const auto at = m_objects.find(object);
+    if (at == m_objects.end()) throw RemoteError("no such remote object");
+    const Exported exported = at->second;
+    return exported.m_dispatcher->Call(exported.m_self, method, std::move(ar));
+  }
+
+  Archive ErrorReply(uint32 answer, xstring const& text) {
+    Report(text);
     Archive reply;
     SerialiseVariableLengthUint(reply, answer);
-    reply.Write(results.m_bytes.data(), results.m_bytes.size());
-    m_channel.Send(reply.m_bytes);
+    reply << octet_t(AN_ERROR) << text;
+    return reply;
+  }
+  void Report(std::string const& text) const {
+    if (m_onError) m_onError(text);
   }
 
   Channel& m_channel;
-  std::vector<Exported> m_objects;
+  std::size_t m_messageLimit = kMessageLimit;
+  ErrorFunction m_onError;
+  uint32 m_lastNumber = 0;
+  std::map<uint32, Exported> m_objects;
 };
 
 // The client's view of an exported object. The stub behind it is the caller's.

@@ -49,8 +49,15 @@ void AssignArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t e
   for (ssize_t i = begin; i < end; ++i) array[at++] = source[i];
 }
 
+// The range that asks for the alignment of the type in place of destroying anything.
+constexpr ssize_t kAskAlignment = -1;
+
 template <typename T>
 void DestructArray(T* array, ssize_t begin, ssize_t end) {
+  if (begin == kAskAlignment) {
+    *static_cast<ssize_t*>(static_cast<void*>(array)) = alignof(T);
+    return;
+  }
   for (ssize_t i = begin; i < end; ++i) array[i].~T();
 }
 
@@ -73,6 +80,14 @@ void DeserialiseArray(InputArchive& ar, T* array, ssize_t begin, ssize_t end) {
   } else {
     throw ArchiveError("type cannot be archived");
   }
+}
+
+// Of a type that is known only by its operations. One that cannot be destroyed is taken to be aligned by its size.
+inline std::size_t AlignmentOf(TypeOps const& ops) {
+  if (!ops.m_destruct) return std::min<std::size_t>(ops.m_size & (~ops.m_size + 1), alignof(void*));
+  ssize_t alignment;
+  ops.m_destruct(&alignment, kAskAlignment, kAskAlignment);
+  return static_cast<std::size_t>(alignment);
 }
 
 template <typename T>

@@ -11,6 +11,10 @@ namespace vesk {
 struct IObjectVisitor {
   virtual ~IObjectVisitor() {}
   virtual void VisitObject(ptr<IObject> const& object) = 0;
+
+  // Where the first value that is visited stands, for who seeks it.
+  bool m_seeks = false;
+  void const* m_found = nullptr;
 };
 
 // Is told each pref and cref, null ones included.
@@ -81,6 +85,10 @@ void VisitParts(V& v, T const& x) {
 
 template <typename T>
 IObjectVisitor& operator<<(IObjectVisitor& v, T const& x) {
+  if (v.m_seeks) {
+    v.m_found = &x;
+    v.m_seeks = false;
+  }
   if constexpr (ReferenceKind<T>::value == 1) {
     VisitObjectBehind(v, x);
   } else if constexpr (ReferenceKind<T>::value >= 2) {

@@ -21,13 +21,21 @@ $interface ipc IEmptyIpc { };
 $class+ Calc isa ICalc
 {
 public:
-    void Add(int32 a, const vesk::string8& b, int32& sum) { sum = a + int32(b.size()); }
-    void Swap(vesk::string8& a, int32& b) const { a += "!"; b = -b; }
-    void Notify(int32 n) { notified += n; }
-    void Ping() { ++notified; }
-    void Take(Size* size) { notified += size->width; delete size; }
+    void Add(int32 a, const vesk::string8& b, int32& sum) { sum = Sum(a, int32(b.size())); }
+    void Swap(vesk::string8& a, int32& b) const
+    {
+        if (onSwap) onSwap(a);
+        a += "!";
+        b = Sum(~b, 1);
+    }
+    void Notify(int32 n) { notified = Sum(notified, n); }
+    void Ping() { notified = Sum(notified, 1); }
+    void Take(Size* size) { notified = Sum(notified, size->width); delete size; }
     void Vectors(const vesk::xvector<int32>& in, vesk::xvector<int32>& out) { out = in; out.push_back(1); }
+    // Wraps: anyone may call.
+    static int32 Sum(int32 a, int32 b) { return int32(uint32(a) + uint32(b)); }
     int32 notified = 0;
+    std::function<void(vesk::string8&)> onSwap;
 };
 
 }

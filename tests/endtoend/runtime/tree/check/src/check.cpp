@@ -10,6 +10,13 @@ void CheckArchives();
 void CheckSchemas();
 void CheckChanges();
 void CheckRemote();
+void CheckRemoteErrors();
+void CheckRemoteMessages();
+void CheckRemoteAnswers();
+void CheckJsonBothWays();
+void CheckJsonErrors();
+void CheckJsonObjects();
+void CheckAccess();
 void CheckGraph();
 void CheckCaches();
 void CheckVisiting();
@@ -18,7 +25,8 @@ int main()
 {
     Register_Project_check();
     for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
-                       CheckRemote, CheckGraph, CheckCaches, CheckVisiting})
+                       CheckRemote, CheckRemoteErrors, CheckRemoteMessages, CheckRemoteAnswers, CheckJsonBothWays,
+                       CheckJsonErrors, CheckJsonObjects, CheckAccess, CheckGraph, CheckCaches, CheckVisiting})
     {
         check();
     }

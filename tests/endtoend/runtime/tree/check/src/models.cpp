@@ -1,7 +1,6 @@
 @import "check.h"
 @import "kinds/models.h"
 @import "kinds/kinds.h"
-@import "kinds/remote.h"
 
 using namespace kinds;
 
@@ -172,33 +171,4 @@ void CheckChanges()
     both.x = 1;
     both.q = 2;
     CHECK(vxMakeString(both.x << both.q), "12");
-}
-
-void CheckRemote()
-{
-    Calc calc;
-    vesk::LocalChannel channel;
-    vesk::Server server(channel.Server());
-    const vesk::uint32 number = server.Export(vesk::ptr<ICalc>(&calc));
-    vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
-    const auto stub = vesk::Import<ICalc>(client, number);
-    const vesk::ptr<ICalc> far(stub->Interface());
-    int32 sum = 0;
-    far->Add(3, "four", sum);
-    CHECK(sum, 7);
-    vesk::string8 text = "a";
-    int32 n = 5;
-    far->Swap(text, n);
-    CHECK(vxMakeString(text << n), "a!-5");
-    far->Notify(3);
-    CHECK(calc.notified, 0);
-    far->Ping();
-    Size size(100);
-    far->Take(&size);
-    vesk::xvector<int32> in = {5}, out;
-    far->Vectors(in, out);
-    CHECK(vxMakeString(calc.notified << out), "104[5,1]");
-    CHECK(bool(vesk::QueryInterface<ICalc>(far)), true);
-    const auto lost = vesk::Import<ICalc>(client, 9);
-    CHECK(Throws([&] { vesk::ptr<ICalc>(lost->Interface())->Add(1, "", sum); }), true);
 }

@@ -2,6 +2,7 @@
 @import "kinds/kinds.h"
 @import "kinds/graph.h"
 @import "kinds/remote.h"
+@import "kinds/plain.h"
 
 vxDefineTarget(kinds, 3)
 

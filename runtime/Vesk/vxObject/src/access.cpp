@@ -1,0 +1,280 @@
+// Values by name, and their text.
+
+@import "Vesk/vxObject/ValueTypes.h"
+
+namespace vesk {
+
+struct Value::Owner {
+  std::shared_ptr<Owner> m_outer;
+  ReflectedClass const* m_record;  // null for a container
+  void* m_object;
+  xstring m_path;                     // from the outermost value to what is changed
+  DGIndepNode* m_node = nullptr;      // of an `$indep` field
+  std::function<void()> m_writeBack;  // of a value that is no object in memory
+  std::shared_ptr<bool> m_bit;
+};
+
+Value::Value(ReflectedClass const& record, void* object)
+    : m_types(std::make_shared<ValueTypes>()), m_type(&m_types->Of(record)), m_address(object) {}
+
+Value::Value(ReflectedType const& type, void* address)
+    : m_types(std::make_shared<ValueTypes>()), m_type(&m_types->Of(type)), m_address(address) {}
+
+EValueKind Value::Kind() const { return m_address ? m_type->m_kind : VK_NONE; }
+
+xstring Value::TypeName() const { return m_type ? m_type->m_text : xstring(); }
+
+ReflectedClass const* Value::Class() const { return m_type ? m_type->m_class : nullptr; }
+
+ValueType const& Value::Type() const {
+  if (!m_address) throw AccessError("no value");
+  return *m_type;
+}
+
+ssize_t Value::Count() const {
+  switch (Kind()) {
+    case VK_CLASS:
+      return static_cast<ssize_t>(m_types->FieldsOf(*m_type).size());
+    case VK_LIST:
+    case VK_SET:
+    case VK_MAP:
+      return CountOf(*m_type, m_address);
+    default:
+      return 0;
+  }
+}
+
+Value Value::Child(ValueType const* type, void* address, xstring const& name) const {
+  Value child;
+  child.m_types = m_types;
+  child.m_type = type;
+  child.m_address = address;
+  child.m_owner = std::make_shared<Owner>();
+  child.m_owner->m_outer = m_owner;
+  child.m_owner->m_record = m_type->m_class;
+  child.m_owner->m_object = m_address;
+  child.m_owner->m_path = m_owner ? m_owner->m_path : xstring();
+  if (!child.m_owner->m_path.empty() && name[0] != '[') child.m_owner->m_path += '.';
+  child.m_owner->m_path += name;
+  return child;
+}
+
+Value Value::FieldAt(ssize_t position) const {
+  ValueField const& field = m_types->FieldsOf(*m_type)[position];
+  Value child = Child(field.m_type, static_cast<octet_t*>(m_address) + field.m_offset, field.m_name);
+  if (DGIndepNode* node = IndepNodeAt(*m_type->m_class, m_address, field)) {
+    node->ReadBarrier();
+    child.m_owner->m_node = node;
+    child.m_address = ValueBeforeNode(*node, *field.m_type);
+  }
+  return child;
+}
+
+xstring Value::EntryName(ssize_t position, void* entry) const {
+  if (m_type->m_kind == VK_LIST) return vxMakeString(position);
+  return Child(m_type->m_key ? m_type->m_key : m_type->m_item, entry, xstring()).Text();
+}
+
+Value Value::EntryAt(ssize_t position, void* entry) const {
+  Value child = Child(m_type->m_item, m_type->ItemOf(entry), '[' + EntryName(position, entry) + ']');
+  if (m_type->m_code != RC_VECTOR || m_type->m_item->m_kind != VK_BOOL) return child;
+  // A bit has no address.
+  xvector<bool>& bits = *static_cast<xvector<bool>*>(m_address);
+  const auto bit = std::make_shared<bool>(bits[position]);
+  child.m_address = bit.get();
+  child.m_owner->m_bit = bit;
+  child.m_owner->m_writeBack = [&bits, position, bit = bit.get()] { bits[position] = *bit; };
+  return child;
+}
+
+void Value::Each(EachFunction const& each) const {
+  const EValueKind kind = Kind();
+  if (kind == VK_CLASS) {
+    xvector<ValueField> const& fields = m_types->FieldsOf(*m_type);
+    for (ssize_t i = 0; i < static_cast<ssize_t>(fields.size()) && each(fields[i].m_name, FieldAt(i)); ++i) {
+    }
+  } else if (kind == VK_LIST || kind == VK_SET || kind == VK_MAP) {
+    ssize_t position = 0;
+    EachEntry(*m_type, m_address, [&](void* entry) {
+      const bool goesOn = each(EntryName(position, entry), EntryAt(position, entry));
+      ++position;
+      return goesOn;
+    });
+  }
+}
+
+Value Value::At(ssize_t position) const {
+  if (position < 0 || position >= Count()) throw AccessError("no such position");
+  if (m_type->m_kind == VK_CLASS) return FieldAt(position);
+  ssize_t left = position;
+  Value found;
+  EachEntry(*m_type, m_address, [&](void* entry) {
+    if (left-- > 0) return true;
+    found = EntryAt(position, entry);
+    return false;
+  });
+  return found;
+}
+
+xstring Value::Name(ssize_t position) const {
+  if (position < 0 || position >= Count()) throw AccessError("no such position");
+  if (m_type->m_kind == VK_LIST) return vxMakeString(position);
+  if (m_type->m_kind == VK_CLASS) return m_types->FieldsOf(*m_type)[position].m_name;
+  xstring name;
+  EachEntry(*m_type, m_address, [&](void* entry) {
+    if (position-- > 0) return true;
+    name = EntryName(0, entry);
+    return false;
+  });
+  return name;
+}
+
+Value Value::Find(std::string_view path) const {
+  Value at = *this;
+  while (at && !path.empty()) {
+    std::size_t end;
+    std::string_view name;
+    if (path[0] == '[') {
+      end = path.find(']');
+      if (end == std::string_view::npos) throw AccessError("] expected: " + std::string(path));
+      name = path.substr(1, end++ - 1);
+    } else {
+      if (path[0] == '.') path.remove_prefix(1);
+      end = std::min(path.find_first_of(".["), path.size());
+      name = path.substr(0, end);
+    }
+    path.remove_prefix(end);
+    Value found;
+    at.Each([&](xstring const& each, Value const& value) {
+      if (each == name) found = value;
+      return each != name;
+    });
+    at = found;
+  }
+  return at;
+}
+
+void Value::CheckType(ReflectedType const& type) const {
+  if (Type().m_text != vxMakeString(PlainType(type))) {
+    throw AccessError(m_type->m_text + " is no " + vxMakeString(PlainType(type)));
+  }
+}
+
+void Value::Change(std::function<void()> const& write) const {
+  if (!m_address) throw AccessError("no value");
+  for (Owner const* owner = m_owner.get(); owner; owner = owner->m_outer.get()) {
+    if (!owner->m_outer && ModelHook::Any()) {
+      ModelHook::Notify({ModelChange::Write, owner->m_object, owner->m_record, Path(), m_owner->m_path.c_str()});
+    }
+    if (owner->m_record) PathSource::OnWrite(owner->m_object, Path());
+  }
+  DataSource::OnWrite(m_address, m_type->m_size, nullptr);
+  write();
+  for (Owner const* owner = m_owner.get(); owner; owner = owner->m_outer.get()) {
+    if (owner->m_writeBack) owner->m_writeBack();
+    if (owner->m_node) owner->m_node->OnChange();
+  }
+}
+
+// --- Text
+
+namespace {
+
+void PrintText(xostream& os, Value const& value) {
+  if (!value) {
+    os << '?';
+    return;
+  }
+  ValueType const& type = value.Type();
+  if (type.m_kind == VK_ENUM) {
+    PrintEnum(os, type.m_enum, *static_cast<int32 const*>(value.Address()));
+  } else if (type.m_kind == VK_OPENVARIANT) {
+    os << *static_cast<openvariant<int32> const*>(value.Address());
+  } else if (type.m_kind == VK_REFERENCE) {
+    os << *static_cast<void* const*>(value.Address());
+  } else if (type.m_ops && type.m_ops->m_print) {
+    type.m_ops->m_print(os, value.Address());
+  } else if (type.m_kind == VK_NONE || type.m_kind == VK_VARIANT) {
+    os << '?';
+  } else {
+    const bool isClass = type.m_kind == VK_CLASS;
+    if (isClass) os << type.m_text;
+    os << (isClass ? '(' : '[');
+    bool isFirst = true;
+    value.Each([&](xstring const& name, Value const& item) {
+      if (!std::exchange(isFirst, false)) os << ',';
+      if (type.m_kind == VK_MAP) os << '(' << name << ',';
+      PrintText(os, item);
+      if (type.m_kind == VK_MAP) os << ')';
+      return true;
+    });
+    os << (isClass ? ')' : ']');
+  }
+}
+
+// Values inside values are few levels deep: only references lead further, and they are not followed.
+void PrintDump(xostream& os, Value const& value) {
+  const EValueKind kind = value.Kind();
+  if (kind == VK_TEXT) {
+    os << " = \"" << value.Text() << "\"\n";
+    return;
+  }
+  if (kind != VK_CLASS && kind != VK_LIST && kind != VK_MAP) {
+    os << " = " << value.Text() << '\n';
+    return;
+  }
+  os << ": " << value.TypeName();
+  if (kind != VK_CLASS) os << ", " << value.Count();
+  os << '\n';
+  os.ChangeIndent(4);
+  value.Each([&](xstring const& name, Value const& item) {
+    os << (kind == VK_CLASS ? name : xstring('[' + name + ']'));
+    PrintDump(os, item);
+    return true;
+  });
+  os.ChangeIndent(-4);
+}
+
+}  // namespace
+
+xstring Value::Text() const {
+  return TextOf([this](xostream& os) { PrintText(os, *this); });
+}
+
+xstring DumpText(Value const& value) {
+  return TextOf([&value](xostream& os) {
+    os << "value";
+    PrintDump(os, value);
+  });
+}
+
+// --- Methods
+
+ReflectedClassMethod const* FindMethod(ReflectedClass const& record, std::string_view name) {
+  for (ssize_t i = 0; i < record.m_numMethods; ++i) {
+    if (record.m_methods[i].m_name == name) return &record.m_methods[i];
+  }
+  return nullptr;
+}
+
+void CheckMethod(ReflectedClass const& record, ReflectedClassMethod const& method, ReflectedType const& result,
+                 xvector<ReflectedType> const& arguments, bool isConst) {
+  auto text = [&record](octet_t const* code) {
+    return code ? vxMakeString(PlainType(DecodeType({code, record.m_strings}))) : xstring("void");
+  };
+  const xstring name = vxMakeString(record.m_name << "::" << method.m_name);
+  auto compare = [&name](xstring const& what, xstring const& has, ReflectedType const& given) {
+    const xstring asked = vxMakeString(PlainType(given));
+    if (has != asked) throw AccessError(name + ": " + what + " is " + has + ", not " + asked);
+  };
+  if (isConst && !method.m_isConst) throw AccessError(name + " is not const");
+  if (method.m_numArgs != static_cast<ssize_t>(arguments.size())) {
+    throw AccessError(vxMakeString(name << " takes " << method.m_numArgs << " arguments, not " << arguments.size()));
+  }
+  compare("the result", text(method.m_return.m_type), result);
+  for (ssize_t i = 0; i < method.m_numArgs; ++i) {
+    compare(method.m_args[i].m_name, text(method.m_args[i].m_type), arguments[i]);
+  }
+}
+
+}  // namespace vesk

@@ -1,0 +1,407 @@
+// Values and objects as JSON and by name, known by their records alone.
+@import "check.h"
+@import "kinds/graph.h"
+@import "kinds/plain.h"
+@import "Vesk/vxObject/Json.h"
+
+using namespace kinds;
+
+namespace
+{
+
+// Quotes as apostrophes, for text that is full of them.
+vesk::xstring Q(vesk::xstring text)
+{
+    std::replace(text.begin(), text.end(), '\'', '"');
+    return text;
+}
+
+vesk::xstring JsonOf(vesk::Value const& value)
+{
+    try
+    {
+        return vesk::ToJson(value);
+    }
+    catch (vesk::AccessError const& error)
+    {
+        return error.what();
+    }
+}
+
+template <typename T>
+vesk::xstring Json(T const& value)
+{
+    return JsonOf(vesk::Value::Of(value));
+}
+
+template <typename T>
+vesk::xstring ErrorOf(T& value, std::string_view text, vesk::JsonLimits const& limits = {})
+{
+    try
+    {
+        vesk::FromJsonText(value, text, limits);
+    }
+    catch (vesk::AccessError const& error)
+    {
+        return error.what();
+    }
+    return "none";
+}
+
+// What the value is after the text was read, or the error.
+template <typename T>
+vesk::xstring Read(std::string_view text)
+{
+    T value = T();
+    const vesk::xstring error = ErrorOf(value, text);
+    return error == "none" ? Json(value) : error;
+}
+
+Part MakePart(int32 number, vesk::string8 const& name)
+{
+    Part part;
+    part.number = number;
+    part.name = name;
+    part.marks = {1, -2};
+    return part;
+}
+
+void Fill(Reflected& r)
+{
+    r.flag = true;
+    r.i8 = -128;
+    r.i64 = INT64_MIN;
+    r.i128 = -int128(~uint128(0) >> 1) - 1;
+    r.u64 = UINT64_MAX;
+    r.u128 = ~uint128(0);
+    r.f32 = 0.1f;
+    r.f64 = -1e300;
+    r.s8 = "a\"\\\n\x01\xc3\xa9\xf0\x9f\x98\x80";
+    r.s16 = {0x41, 0xD83D, 0xDE00, 0xD800};
+    r.colour = shapes::Blue;
+    r.level = shapes::Level::High;
+    const Part part = MakePart(7, "p"), other = MakePart(8, "a much longer name than fits");
+    r.part = part;
+    r.parts = {part, other};
+    r.bits = {true, false, true};
+    r.words = {{"a", "b"}, {}, {"c"}};
+    r.dynamic = {other, part};
+    r.list = {part, other, part};
+    r.bytes = {1, 2, 3};
+    r.deque = {part, other};
+    r.shorts = {4, 5};
+    r.names = {"x", "$y"};
+    r.partSet = {part, other};
+    r.bag = {3, 3, 1};
+    r.wides = {Wide(5), Wide(4)};
+    r.byName["$k"] = part;
+    r.byName[""] = other;
+    r.deep[-4] = {{{"a", 1.5}}, {}};
+    r.byColour[shapes::Green] = 3;
+    r.wideMap[2] = Wide(9);
+    r.byPart[other] = 1;
+    r.byFloat[0.5] = "half";
+    r.trees = {Tree::leaf(1), Tree(), Tree::leaf(3)};
+    r.any = vesk::string8("any");
+    r.typedefd = {6};
+    r.fixed[1] = 9;
+}
+
+}
+
+void CheckJsonBothWays()
+{
+    Reflected r;
+    Fill(r);
+    const vesk::xstring text = Json(r);
+    vesk::xstring expected =
+        Q("{'flag':true,'i8':-128,'i16':0,'i64':'-9223372036854775808',"
+          "'i128':'-170141183460469231731687303715884105728','u64':'18446744073709551615',"
+          "'u128':'340282366920938463463374607431768211455','f32':0.1,'f64':-1e+300,'c8':'a','c16':'b',"
+          "'s8':'a\\'\\\\\\n\\u0001é😀','s16':'A😀\\ud800','colour':'Blue','level':'High','part':PART,'parts':[PART,OTHER],"
+          "'bits':[true,false,true],'words':[['a','b'],[],['c']],'dynamic':[OTHER,PART],'list':[PART,OTHER,PART],"
+          "'bytes':[1,2,3],'deque':[PART,OTHER],'shorts':[4,5],'names':['$y','x'],'partSet':[PART,OTHER],"
+          "'bag':[1,3,3],'wides':[{'big':'4','small':0},{'big':'5','small':0}],'byName':{'':OTHER,'$$k':PART},"
+          "'deep':{'-4':[{'a':1.5},{}]},'byColour':{'Green':3},'wideMap':{'2':{'big':'9','small':0}},"
+          "'byPart':[[OTHER,1]],'byFloat':[[0.5,'half']],'trees':[{'leaf':1},{'void':null},{'leaf':3}],"
+          "'any':{'$type':'string8','$value':'any'},'objects':{},'shared':null,'typedefd':[6],'fixed':[0,9,0]}");
+    auto replace = [&expected](std::string const& name, std::string const& by) {
+        for (std::size_t at; (at = expected.find(name)) != std::string::npos;) expected.replace(at, name.size(), by);
+    };
+    replace("PART", Q("{'number':7,'name':'p','marks':[1,-2]}"));
+    replace("OTHER", Q("{'number':8,'name':'a much longer name than fits','marks':[1,-2]}"));
+    CHECK(text, expected);
+
+    Reflected copy;
+    copy.list = {Part(), Part()};
+    copy.byName["old"] = Part();
+    copy.dynamic = {Part()};
+    CHECK(ErrorOf(copy, text), "none");
+    CHECK(Json(copy), text);
+    // What was made is what the class itself would have made: it can be used and destroyed as any other.
+    CHECK(copy.list == r.list && copy.deque == r.deque && copy.partSet == r.partSet && copy.bag == r.bag, true);
+    copy.parts.push_back(Part());
+    copy.list.push_back(Part());
+    copy.deque.push_front(Part());
+    copy.byName["new"].marks.push_back(1);
+    copy.dynamic.resize(5);
+    CHECK(copy.partSet.Contains(r.part) && copy.byName.at("$k") == r.part && copy.deep.at(-4)[0].at("a") == 1.5, true);
+
+    // Indented, and partly.
+    Part part = MakePart(1, "n");
+    vesk::JsonStyle style;
+    style.m_indent = 2;
+    CHECK(vesk::ToJsonText(part, style),
+          "{\n  \"number\": 1,\n  \"name\": \"n\",\n  \"marks\": [\n    1,\n    -2\n  ]\n}");
+    CHECK(ErrorOf(part, Q(" { 'name' : 'm' } ")), "none");
+    CHECK(Json(part), Q("{'number':1,'name':'m','marks':[1,-2]}"));
+
+    // A model, with containers of all kinds in it.
+    Everything all;
+    all.maps[2]["k"] = 2.5;
+    all.names.Insert("n");
+    all.grid[1][2].height = 6;
+    all.any = Size(3);
+    Everything read;
+    CHECK(ErrorOf(read, Json(all)), "none");
+    CHECK(read == all, true);
+
+    // Variants: items by name, and by their archive where the record tells nothing.
+    vesk::xvector<Value> values = {Value(), Value(vesk::string8("t")), Value::ratio(2.5), Value::list({1, 2}),
+                                   Value(Size(3)), Value::numbers({4})};
+    CHECK(Json(values),
+          Q("[{'int32':7},{'string8':'t'},{'ratio':2.5},{'list':{'$bytes':'020100000002000000'}},"
+          "{'kinds::Size':{'width':3,'height':3,'colour':'Red','level':'Mid'}},{'numbers':[4]}]"));
+    vesk::xvector<Value> back;
+    CHECK(ErrorOf(back, Json(values)), "none");
+    CHECK(back == values, true);
+}
+
+void CheckJsonErrors()
+{
+    typedef vesk::xvector<int32> Ints;
+    for (auto [text, error] : std::initializer_list<std::pair<const char*, const char*>>{
+             {"", "line 1, column 1: expected a value"},
+             {"[1", "line 1, column 3: expected , or ]"},
+             {"[1,]", "line 1, column 4: expected a value"},
+             {"[1 2]", "line 1, column 4: expected , or ]"},
+             {"[1]]", "line 1, column 4: text behind the value"},
+             {"[1}\n", "line 1, column 3: expected , or ]"},
+             {"\n [01]", "line 2, column 3: number with a leading zero"},
+             {"[-]", "line 1, column 3: expected a digit"},
+             {"[1.]", "line 1, column 4: expected a digit"},
+             {"[1e]", "line 1, column 4: expected a digit"},
+             {"[nul]", "line 1, column 2: expected a value"},
+             {"[1.5]", "line 1, column 2: expected an integer"},
+             {"[1e1]", "line 1, column 2: expected an integer"},
+             {"[2147483648]", "line 1, column 2: out of the range of int32"},
+             {"[-2147483649]", "line 1, column 2: out of the range of int32"},
+             {"[\"\"]", "line 1, column 2: expected digits"},
+             {"[\"1x\"]", "line 1, column 2: expected an integer"},
+             {"[true]", "line 1, column 2: expected a number"},
+             {"{}", "line 1, column 1: expected an array"},
+             {"[-2147483648, \"2147483647\"]", "[-2147483648,2147483647]"}})
+    {
+        CHECK(Read<Ints>(text), error);
+    }
+    CHECK(Read<vesk::string8>("\"\xff\""), "line 1, column 2: text is not UTF-8");
+    CHECK(Read<vesk::string8>("\"\xed\xa0\x80\""), "line 1, column 2: text is not UTF-8");
+    CHECK(Read<vesk::string8>("\"\n\""), "line 1, column 2: control character in a string");
+    CHECK(Read<vesk::string8>("\"a"), "line 1, column 1: string without an end");
+    CHECK(Read<vesk::string8>("\"\\x\""), "line 1, column 3: unknown escape");
+    CHECK(Read<vesk::string8>("\"\\u12g4\""), "line 1, column 6: expected four hexadecimal digits");
+    CHECK(Read<vesk::string8>("\"\\ud800\""), "line 1, column 1: lone surrogate in a string of UTF-8");
+    CHECK(Read<vesk::string8>("\"\\ud83d\\ude00\\/\\u0041\""), "\"😀/A\"");
+    CHECK(Json(vesk::string8("\xff")), "string is not UTF-8");
+    CHECK(Read<vesk::float64>("1e999"), "line 1, column 1: out of range");
+    for (auto text : {"1e-999", "0.0001e-330", "0.1e-99999999999999999999"}) CHECK(Read<vesk::float64>(text), "0");
+    for (auto text : {"100000e305", "1e99999999999999999999", "-1e+309"})
+    {
+        CHECK(Read<vesk::float64>(text), "line 1, column 1: out of range");
+    }
+    CHECK(Read<vesk::float32>("1e39"), "line 1, column 1: out of range");
+    CHECK(Read<vesk::float64>("\"-Infinity\""), "\"-Infinity\"");
+    CHECK(Read<vesk::float64>("\"NaN\""), "\"NaN\"");
+    CHECK(Read<vesk::uint64>("18446744073709551616"), "line 1, column 1: out of the range of uint64");
+    CHECK(Read<vesk::uint64>("-1"), "line 1, column 1: out of the range of uint64");
+    CHECK(Read<vesk::uint128>("\"340282366920938463463374607431768211456\""),
+          "line 1, column 1: out of the range of uint128");
+    CHECK(Read<bool>("1"), "line 1, column 1: expected true or false");
+    CHECK(Read<shapes::Level>("\"Top\""), "line 1, column 1: no label of shapes::Level: Top");
+    CHECK(Read<shapes::Colour>("7"), "line 1, column 1: no label of shapes::Colour: 7");
+    CHECK(Read<shapes::Colour>("6"), "\"Blue\"");
+    CHECK((Read<vesk::Array<int32, 2>>("[1]")), "line 1, column 1: expected 2 elements");
+    CHECK(Read<vesk::xset<int32>>("[1,1]"), "line 1, column 4: repeated element");
+    CHECK((Read<vesk::xmap<int32, bool>>(Q("{'1':true,'01':true}"))), "line 1, column 11: repeated key");
+    CHECK(Read<Part>(Q("{'number':1,'number':2}")), "line 1, column 13: repeated member number");
+    CHECK(Read<Part>(Q("{'nummer':1}")), "line 1, column 2: no field nummer in kinds::Part");
+    CHECK(Read<Value>(Q("{'void':null}")), "line 1, column 2: no item void in kinds::Value");
+    CHECK(Read<Value>("{}"), "line 1, column 1: expected one item");
+    CHECK(Read<Value>(Q("{'ratio':1,'name':'n'}")), "line 1, column 12: expected one item");
+    CHECK(Read<Value>(Q("{'point':{'$bytes':'01'}}")),
+          "line 1, column 1: read beyond the end of an archive");
+    CHECK(Read<vesk::openvariant<int32>>(Q("{'$type':'nobody','$value':{'$bytes':''}}")),
+          "line 1, column 1: type of an openvariant is not registered: nobody");
+    CHECK(Read<vesk::openvariant<int32>>(Q("{'$type':'kinds::Everything','$value':{}}")),
+          "references in a variant: kinds::Everything");
+    CHECK(Json(vesk::openvariant<int32>(vesk::xlist<int32>{1})), "type of an openvariant is not registered");
+    // Limits.
+    CHECK(Read<Tree>(std::string(200000, '[')), "line 1, column 101: nested too deeply");
+    vesk::JsonLimits limits;
+    limits.m_memory = 1000;
+    limits.m_bytes = 3000;
+    Ints ints;
+    CHECK(ErrorOf(ints, "[" + std::string(2000, ' ') + "]", limits), "none");
+    CHECK(ErrorOf(ints, std::string(3001, ' '), limits), "text of 3001 bytes");
+    vesk::xvector<Reflected> large;
+    CHECK(ErrorOf(large, "[{},{},{}]", limits), "line 1, column 1: more memory than is allowed");
+    limits.m_ignoreUnknown = true;
+    Part part;
+    CHECK(ErrorOf(part, Q("{'x':[{'number':5},'}'],'number':2}"), limits), "none");
+    CHECK(part.number, 2);
+}
+
+void CheckJsonObjects()
+{
+    // A cycle of two, by interfaces.
+    Doc doc, next;
+    doc.title = "one";
+    next.title = "two";
+    doc.next = &next;
+    next.next = &doc;
+    next.list.push_back(vesk::pref<IDoc>(&next));
+    const vesk::xstring text = vesk::ObjectToJson(vesk::ptr<IDoc>(&doc));
+    CHECK(text.substr(0, 60), Q("{'$objects':[{'$class':'kinds::Doc','title':'one','count':0,"));
+    CHECK(text.substr(text.size() - 22), Q("],'$value':{'$ref':1}}"));
+    const vesk::ptr<IDoc> copy = vesk::ObjectFromJson<IDoc>(text);
+    CHECK(vesk::ObjectToJson(copy), text);
+    Doc& read = *static_cast<Doc*>(copy.Object());
+    Doc& second = *static_cast<Doc*>(read.next.Get().Object());
+    CHECK(second.next.Get() == copy && second.list.read()[0].Object() == &second, true);
+    second.DestroyObject();
+    read.DestroyObject();
+
+    // A long chain is a flat list.
+    vesk::xvector<Doc> chain(20000);
+    for (std::size_t i = 1; i < chain.size(); ++i) chain[i - 1].next = &chain[i];
+    const vesk::xstring flat = vesk::ObjectToJson(vesk::ptr<IDoc>(&chain[0]));
+    vesk::ptr<IDoc> at = vesk::ObjectFromJson<IDoc>(flat);
+    ssize_t length = 0;
+    while (at)
+    {
+        Doc* object = static_cast<Doc*>(at.Object());
+        at = object->next.Get();
+        object->DestroyObject();
+        ++length;
+    }
+    CHECK(length, 20000);
+
+    // Plain structs behind a cref; objects as values of a map.
+    Part part = MakePart(3, "shared");
+    Reflected r;
+    r.shared = &part;
+    r.objects["doc"] = vesk::pref<vesk::IObject>(vesk::ptr<vesk::IObject>(&doc));
+    doc.next = nullptr;
+    Reflected other;
+    CHECK(ErrorOf(other, Json(r)), "none");
+    CHECK(Json(other), Json(r));
+    CHECK(*other.shared == part, true);
+    delete other.shared.Get();
+    other.objects["doc"]->DestroyObject();
+
+    // What may be made, and what a refused text leaves: nothing.
+    auto refused = [](std::string_view objects) {
+        Reflected target;
+        vesk::JsonLimits limits;
+        limits.m_allow = [](vesk::ReflectedClass const& record) { return record.m_name != std::string("kinds::Calc"); };
+        const vesk::xstring error =
+            ErrorOf(target, vxMakeString("{\"$objects\":[" << objects << "],\"$value\":{\"shared\":{\"$ref\":1},"
+                                                           << "\"objects\":{\"a\":{\"$ref\":2}}}}"), limits);
+        CHECK(target.shared.Get() == nullptr && (target.objects.empty() || !target.objects["a"]), true);
+        return error;
+    };
+    const vesk::xstring shared = Q("{'$class':'kinds::Part'},");
+    CHECK(refused(shared + Q("{'$class':'kinds::Doc','next':{'$ref':9}}")), "line 1, column 69: no such object");
+    CHECK(refused(shared + Q("{'$class':'kinds::Part'}")), "line 1, column 110: kinds::Part is no vesk::IObject");
+    CHECK(refused(shared + Q("{'$class':'kinds::Nobody'}")), "line 1, column 39: no class to create: kinds::Nobody");
+    CHECK(refused(shared + Q("{'$class':'kinds::Calc'}")), "line 1, column 39: class is not allowed: kinds::Calc");
+    CHECK(refused(shared + Q("{'$class':'kinds::Doc'},{'$class':'kinds::Doc','next':{'$ref':3}}")),
+          "line 1, column 164: object 3 is not reached from the value");
+    CHECK(refused(Q("{'$class':'kinds::Doc'},{}")), "line 1, column 39: expected $class");
+    CHECK(refused(Q("{'$class':'kinds::Doc'},{'$class':'kinds::Doc'}")),
+          "line 1, column 82: kinds::Doc is no kinds::Part");
+}
+
+void CheckAccess()
+{
+    Reflected r;
+    Fill(r);
+    const vesk::Value value = vesk::Value::Of(r);
+    CHECK(vxMakeString(value.Count() << value.Name(0) << value.At(1).Text()), "41flag-128");
+    CHECK(value.Find("parts[1].marks[0]").As<vesk::int8>(), 1);
+    CHECK(value.Find("deep[-4][0][a]").Text(), "1.5");
+    CHECK(value.Find("byColour").Text(), "[(Green,3)]");
+    CHECK(bool(value.Find("parts[9]")) || bool(value.Find("nothing.at.all")), false);
+    CHECK(value.Find("parts").TypeName(), "xvector<kinds::Part>");
+    CHECK(value.Find("typedefd").TypeName(), "xvector<int32>");
+    value.Find("parts[1].name").Set(vesk::string8("set"));
+    CHECK(r.parts[1].name, "set");
+    value.Find("bits[1]").Set(true);
+    CHECK(bool(r.bits[1]), true);
+    vesk::FromJson(value.Find("byName[$k]"), Q("{'number':70}"));
+    CHECK(r.byName["$k"].number, 70);
+    CHECK(Throws([&] { value.Find("i8").Set(int32(1)); }), true);
+    CHECK(Throws([&] { value.At(41); }), true);
+    CHECK(Throws([&] { vesk::Value().Set(1); }), true);
+    CHECK(vesk::DumpText(value.Find("parts[0]")),
+          "value: kinds::Part\n    number = 7\n    name = \"p\"\n    marks: xvector<int8>, 2\n        [0] = 1\n"
+          "        [1] = -2\n");
+
+    // Hooks and the graph are told, of models and of sources.
+    Watched watched;
+    watched.size.width = 2;
+    watched.size.height += 3;
+    CHECK(watched.area.read(), 6);
+    vesk::xvector<vesk::xstring> changes;
+    {
+        vesk::ModelHook hook([&](vesk::ModelChange const& change) { changes.push_back(change.PathText()); });
+        vesk::Value::Of(watched).Find("size.width").Set(int32(5));
+    }
+    CHECK(changes, "[size.width]");
+    CHECK(watched.area.read(), 15);
+    Sources sources;
+    sources.number = 20;
+    sources.tiny = 1;
+    CHECK(sources.twice.read(), 41);
+    CHECK(Json(sources), Q("{'tiny':1,'number':20,'text':''}"));
+    vesk::FromJsonText(sources, Q("{'tiny':2,'text':'t'}"));
+    CHECK(vxMakeString(sources.twice.read() << sources.text.read()), "42t");
+    vesk::Value::Of(sources).Find("number").Set(int32(1));
+    CHECK(sources.twice.read(), 4);
+
+    // Methods by name.
+    CHECK(vesk::CallMethod<int32(int32, int32)>(r, "Add", 200, 1), 73);
+    vesk::CallMethod<void(vesk::string8 const&)>(r, "Rename", "renamed");
+    CHECK(r.s8, "renamed");
+    Reflected const& fixed = r;
+    auto error = [](auto call) {
+        try
+        {
+            call();
+        }
+        catch (vesk::AccessError const& e)
+        {
+            return vesk::xstring(e.what());
+        }
+        return vesk::xstring();
+    };
+    CHECK(error([&] { vesk::CallMethod<void(vesk::string8 const&)>(fixed, "Rename", ""); }),
+          "kinds::Reflected::Rename is not const");
+    CHECK(error([&] { vesk::CallMethod<int32(int32)>(r, "Add", 1); }),
+          "kinds::Reflected::Add takes 2 arguments, not 1");
+    CHECK(error([&] { vesk::CallMethod<int32(int32, int64)>(r, "Add", 1, 2); }),
+          "kinds::Reflected::Add: b is int32, not int64");
+    CHECK(error([&] { vesk::CallMethod<void(int32, int32)>(r, "Add", 1, 2); }),
+          "kinds::Reflected::Add: the result is int32, not void");
+    CHECK(error([&] { vesk::CallMethod<void()>(r, "Remove"); }), "no method Remove in kinds::Reflected");
+}

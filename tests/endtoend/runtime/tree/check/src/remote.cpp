@@ -1,0 +1,209 @@
+// Calls over a channel, and what each side makes of an end that fails, lies or goes away.
+@import "check.h"
+@import "kinds/remote.h"
+
+using namespace kinds;
+
+typedef vesk::xvector<vesk::octet_t> Bytes;
+
+void CheckRemote()
+{
+    Calc calc;
+    vesk::LocalChannel channel;
+    vesk::Server server(channel.Server());
+    const vesk::uint32 number = server.Export(vesk::ptr<ICalc>(&calc));
+    vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
+    const auto stub = vesk::Import<ICalc>(client, number);
+    const vesk::ptr<ICalc> far(stub->Interface());
+    int32 sum = 0;
+    far->Add(3, "four", sum);
+    CHECK(sum, 7);
+    vesk::string8 text = "a";
+    int32 n = 5;
+    far->Swap(text, n);
+    CHECK(vxMakeString(text << n), "a!-5");
+    far->Notify(3);
+    CHECK(calc.notified, 0);
+    far->Ping();
+    Size size(100);
+    far->Take(&size);
+    vesk::xvector<int32> in = {5}, out;
+    far->Vectors(in, out);
+    CHECK(vxMakeString(calc.notified << out), "104[5,1]");
+    CHECK(bool(vesk::QueryInterface<ICalc>(far)), true);
+    const auto lost = vesk::Import<ICalc>(client, 9);
+    CHECK(Throws([&] { vesk::ptr<ICalc>(lost->Interface())->Add(1, "", sum); }), true);
+}
+
+namespace
+{
+
+// A client and a server in one thread; what the server was told of goes to `errors`.
+struct Wire
+{
+    Wire() : server(channel.Server()), client(channel.Client(), [this] { server.Serve(); })
+    {
+        server.OnError([this](std::string const& text) { errors.push_back(text); });
+    }
+    vesk::LocalChannel channel;
+    vesk::Server server;
+    vesk::ClientConnection client;
+    vesk::xvector<vesk::xstring> errors;
+};
+
+// A message as a stub sends it.
+template <typename... Values>
+Bytes Message(vesk::uint32 object, vesk::uint32 method, vesk::uint32 answer, Values const&... values)
+{
+    vesk::Archive ar;
+    for (vesk::uint32 number : {object, method, answer}) vesk::SerialiseVariableLengthUint(ar, number);
+    (void)(ar << ... << values);
+    return ar.m_bytes;
+}
+
+vesk::xstring ErrorOf(std::function<void()> action)
+{
+    try
+    {
+        action();
+    }
+    catch (vesk::RemoteError const& error)
+    {
+        return error.what();
+    }
+    return "none";
+}
+
+}
+
+void CheckRemoteErrors()
+{
+    Calc calc;
+    Wire wire;
+    calc.onSwap = [](vesk::string8& a) {
+        if (a == "standard") throw std::logic_error("not today");
+        if (a == "other") throw 7;
+    };
+    const vesk::uint32 number = wire.server.Export(vesk::ptr<ICalc>(&calc));
+    const auto stub = vesk::Import<ICalc>(wire.client, number);
+    const vesk::ptr<ICalc> far(stub->Interface());
+    int32 n = 1;
+    auto swap = [&](vesk::string8 text) { return ErrorOf([&] { far->Swap(text, n); }); };
+
+    // What a method throws reaches its caller alone; the next call is served.
+    CHECK(swap("standard"), "not today");
+    CHECK(swap("other"), "remote method failed");
+    CHECK(swap("fine"), "none");
+    CHECK(n, -1);
+    CHECK(wire.errors, "[not today,remote method failed]");
+
+    // Exports: null and names without a factory are refused and leave nothing behind.
+    CHECK(ErrorOf([&] { wire.server.Export(vesk::ptr<ICalc>()); }), "null cannot be exported");
+    CHECK(ErrorOf([&] { vesk::FactoryOf<vesk::ISkeletonFactory>("nobody"); }),
+          "no remote interface of this name: nobody");
+    const vesk::uint32 second = wire.server.Export(vesk::ptr<ICalc>(&calc));
+    CHECK(second, number + 1);
+    CHECK(wire.server.Unexport(second) && !wire.server.Unexport(second), true);
+    const auto lost = vesk::Import<ICalc>(wire.client, second);
+    vesk::string8 text = "a";
+    CHECK(ErrorOf([&] { vesk::ptr<ICalc>(lost->Interface())->Swap(text, n); }), "no such remote object");
+
+    // A method that takes its own object back.
+    const vesk::uint32 third = wire.server.Export(vesk::ptr<ICalc>(&calc));
+    calc.onSwap = [&](vesk::string8&) { wire.server.Unexport(third); };
+    const auto leaving = vesk::Import<ICalc>(wire.client, third);
+    vesk::ptr<ICalc>(leaving->Interface())->Swap(text, n);
+    CHECK(text, "a!");
+    CHECK(wire.server.Unexport(third), false);
+
+    // A method that calls through its own stub.
+    calc.onSwap = [&](vesk::string8& a) {
+        if (a != "outer") return;
+        int32 sum = 0;
+        far->Add(1, "", sum);
+        a += vxMakeString(sum);
+    };
+    text = "outer";
+    far->Swap(text, n);
+    CHECK(text, "outer1!");
+}
+
+void CheckRemoteMessages()
+{
+    Calc calc;
+    Wire wire;
+    const vesk::uint32 number = wire.server.Export(vesk::ptr<ICalc>(&calc));
+    auto send = [&](Bytes const& message) {
+        wire.errors.clear();
+        wire.channel.Client().Send(message);
+        wire.server.Serve();
+        Bytes reply;
+        wire.channel.Client().Receive(reply);
+        return vxMakeString(wire.errors << reply.size());
+    };
+    CHECK(send({}), "[read beyond the end of an archive]0");
+    CHECK(send({255}), "[read beyond the end of an archive]0");
+    CHECK(send(Message(0, 0, 0)), "[no such remote object]0");
+    CHECK(send(Message(number, 6, 0)), "[no such remote method]0");
+    CHECK(send(Message(number, 4294967295u, 0)), "[no such remote method]0");
+    CHECK(send(Message(number, 2, 0, vesk::int16(3))), "[read beyond the end of an archive]0");
+    CHECK(send(Message(number, 2, 0, int32(3), vesk::int8(1))), "[bytes behind the arguments]0");
+    CHECK(send(Message(number, 3, 0, vesk::int8(1))), "[bytes behind the arguments]0");
+    CHECK(calc.notified, 0);
+    CHECK(send(Message(number, 2, 0, int32(3))), "[]0");
+    CHECK(calc.notified, 3);
+    CHECK(send(Message(number, 0, 9)), vxMakeString("[read beyond the end of an archive]" << 36));
+
+    // Too large, either way.
+    wire.server.SetMessageLimit(100);
+    CHECK(send(Message(number, 0, 0, int32(1), vesk::string8(200, 'x'))), "[message of 209 bytes, the limit is 100]0");
+    const auto stub = vesk::Import<ICalc>(wire.client, number);
+    const vesk::ptr<ICalc> far(stub->Interface());
+    vesk::xvector<int32> in(24, 1), out;
+    CHECK(ErrorOf([&] { far->Vectors(in, out); }), "message of 103 bytes, the limit is 100");
+    wire.client.SetMessageLimit(20);
+    CHECK(ErrorOf([&] { far->Vectors(in, out); }), "message of 100 bytes, the limit is 20");
+}
+
+void CheckRemoteAnswers()
+{
+    // A server that does nothing but send what it is told to.
+    vesk::LocalChannel channel;
+    Bytes reply;
+    vesk::ClientConnection client(channel.Client(), [&] {
+        if (!reply.empty()) channel.Server().Send(reply);
+    });
+    const auto stub = vesk::Import<ICalc>(client, 1);
+    const vesk::ptr<ICalc> far(stub->Interface());
+    vesk::uint8 answer = 0;
+    int32 kept = 0;
+    auto add = [&](Bytes const& behind) {
+        int32 sum = 0;
+        reply = {++answer};
+        reply.insert(reply.end(), behind.begin(), behind.end());
+        const vesk::xstring error = ErrorOf([&] { far->Add(1, "", sum); });
+        kept = sum;
+        return error;
+    };
+    CHECK(add({0, 7, 0, 0, 0}), "none");
+    CHECK(kept, 7);
+    CHECK(add({}), "bad answer: read beyond the end of an archive");
+    CHECK(add({0, 7, 0}), "bad answer: read beyond the end of an archive");
+    CHECK(add({0, 7, 0, 0, 0, 1}), "bad answer: bytes behind the values");
+    CHECK(add({1, 2, 'n', 'o'}), "no");
+    CHECK(add({1, 0}), "remote call failed");
+    CHECK(add({1, 9, 'n'}).substr(0, 11), "bad answer:");
+
+    // A call without an answer fails. Its answer comes during the next call, and finds nobody.
+    reply.clear();
+    ++answer;
+    CHECK(ErrorOf([&] { int32 sum = 0; far->Add(1, "", sum); }), "remote call without an answer");
+    channel.Server().Send({answer, 0, 7, 0, 0, 0});
+    CHECK(add({0, 8, 0, 0, 0}), "none");
+    CHECK(kept, 8);
+
+    // A stub that nobody connected.
+    const std::unique_ptr<vesk::Stub> loose(
+        vesk::FactoryOf<vesk::IStubFactory>(vesk::GetIpcInterfaceName<ICalc>()).CreateStub());
+    CHECK(ErrorOf([&] { vesk::ptr<ICalc>(loose->Interface())->Ping(); }), "stub without a connection");
+}

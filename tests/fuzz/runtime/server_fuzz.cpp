@@ -1,0 +1,121 @@
+// The messages of remote calls. The first byte of an input says whose they are: those of a client, which a server reads
+// one after the other, or the answers that a client gets to a call. Each message is a length in one byte and its bytes.
+// A server comes through whatever it is sent and answers the call behind it; a client's call ends with its values or an
+// error, and no later answer finds what it waited with.
+#include <fstream>
+#include <string>
+#include <vector>
+
+#include "kinds/remote.h"
+
+void Register_Project_kinds();
+
+namespace {
+
+using Bytes = vesk::xvector<vesk::octet_t>;
+
+struct Input {
+  bool Next(Bytes& message) {
+    if (m_at == m_end) return false;
+    const std::size_t size = std::min<std::size_t>(*m_at++, m_end - m_at);
+    message.assign(m_at, m_at + size);
+    m_at += size;
+    return true;
+  }
+  std::uint8_t const* m_at;
+  std::uint8_t const* m_end;
+};
+
+void Require(bool holds) {
+  if (!holds) std::abort();
+}
+
+void ServeMessages(Input input) {
+  kinds::Calc calc;
+  calc.onSwap = [](vesk::string8& text) {
+    if (text.size() > 3) throw std::runtime_error(text);
+  };
+  vesk::LocalChannel channel;
+  vesk::Server server(channel.Server());
+  server.SetMessageLimit(1000);
+  const vesk::uint32 number = server.Export(vesk::ptr<kinds::ICalc>(&calc));
+  for (Bytes message; input.Next(message);) channel.Client().Send(message);
+  server.Serve();
+  for (Bytes answer; channel.Client().Receive(answer);) {
+  }
+  vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
+  const auto stub = vesk::Import<kinds::ICalc>(client, number);
+  vesk::int32 sum = 0;
+  vesk::ptr<kinds::ICalc>(stub->Interface())->Add(3, "four", sum);
+  Require(sum == 7);
+}
+
+void TakeAnswers(Input input) {
+  vesk::LocalChannel channel;
+  vesk::ClientConnection client(channel.Client(), [&] {
+    Bytes answer;
+    for (int i = 0; i < 3 && input.Next(answer); ++i) channel.Server().Send(answer);
+  });
+  const auto stub = vesk::Import<kinds::ICalc>(client, 1);
+  const vesk::ptr<kinds::ICalc> far(stub->Interface());
+  for (int i = 0; i < 4; ++i) {
+    try {
+      vesk::int32 n = 0;
+      vesk::string8 text = "text";
+      vesk::xvector<vesk::int32> in, out;
+      if (i % 2 == 0) {
+        far->Swap(text, n);
+      } else {
+        far->Vectors(in, out);
+      }
+    } catch (vesk::RemoteError const&) {
+    } catch (vesk::ArchiveError const&) {  // no answer at all
+    }
+  }
+}
+
+template <typename... Values>
+Bytes Message(std::initializer_list<vesk::uint32> numbers, Values const&... values) {
+  vesk::Archive ar;
+  for (vesk::uint32 number : numbers) vesk::SerialiseVariableLengthUint(ar, number);
+  (void)(ar << ... << values);
+  return ar.m_bytes;
+}
+
+std::vector<std::vector<Bytes>> Seeds() {
+  const vesk::string8 text = "text";
+  const vesk::xvector<vesk::int32> numbers = {1, 2, 3};
+  return {{Message({1, 0, 1}, vesk::int32(3), text), Message({1, 1, 2}, text, vesk::int32(3)),
+           Message({1, 2, 0}, vesk::int32(3)), Message({1, 3, 0}), Message({1, 4, 0}, kinds::Size(4)),
+           Message({1, 5, 3}, numbers)},
+          {Message({1, 0}, text, vesk::int32(1)), Message({2, 0}, numbers), Message({3, 1}, text)}};
+}
+
+}  // namespace
+
+// `--seeds FOLDER` writes them.
+extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) {
+  Register_Project_kinds();
+  if (*count < 3 || std::string((*arguments)[1]) != "--seeds") return 0;
+  const std::vector<std::vector<Bytes>> seeds = Seeds();
+  for (std::size_t side = 0; side < seeds.size(); ++side) {
+    std::ofstream file((*arguments)[2] + ("/seed" + std::to_string(side)), std::ios::binary);
+    file.put(static_cast<char>(side));
+    for (Bytes const& message : seeds[side]) {
+      file.put(static_cast<char>(message.size()));
+      file.write(reinterpret_cast<char const*>(message.data()), static_cast<std::streamsize>(message.size()));
+    }
+  }
+  std::exit(0);
+}
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  if (size == 0) return 0;
+  const Input input{data + 1, data + size};
+  if (data[0] % 2 == 0) {
+    ServeMessages(input);
+  } else {
+    TakeAnswers(input);
+  }
+  return 0;
+}
