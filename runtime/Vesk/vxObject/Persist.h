@@ -27,8 +27,17 @@ inline bool ReadObjectNumber(InputArchive& ar, std::size_t& number) {
   DeserialiseVariableLengthUint(ar, number);
   if (number <= ar.m_objects.size()) return false;
   if (number != ar.m_objects.size() + 1) throw ArchiveError("reference to an object that is not in the archive");
-  ar.m_objects.push_back({nullptr, AnyInterface()});
+  if (number > ar.m_limits.m_objects) throw ArchiveError("too many objects in an archive");
+  ar.m_objects.push_back({nullptr, AnyInterface(), nullptr});
   return true;
+}
+
+// What tells the class of an object in an archive from others: its record, else the address of something of its own.
+template <typename C>
+void const* ArchivedType() {
+  static const char mark = 0;
+  void const* record = RecordOf<std::remove_const_t<C>>();
+  return record ? record : &mark;
 }
 
 inline void WritePersistable(Archive& ar, ptr<IPersistable> const& object) {
@@ -46,7 +55,7 @@ inline ptr<IPersistable> ReadPersistable(InputArchive& ar, InputArchive::ReadObj
   if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
   const ptr<IPersistable> object = QueryInterface<IPersistable>(record->m_create());
   if (!object) throw ArchiveError("not persistable: " + name);
-  if (place) *place = {object.Object(), object.Any()};
+  if (place) *place = {object.Object(), object.Any(), record};
   object->Deserialise(ar);
   return object;
 }
@@ -61,7 +70,9 @@ void Deserialise(InputArchive& ar, pref<I>& reference) {
   std::size_t number;
   if (ReadObjectNumber(ar, number)) ReadPersistable(ar, &ar.m_objects[number - 1]);
   reference = pref<I>();
-  if (number > 0) reference = QueryInterface<I>(ptr<IPersistable>(ar.m_objects[number - 1].m_persistable));
+  if (number == 0) return;
+  reference = QueryInterface<I>(ptr<IPersistable>(ar.m_objects[number - 1].m_persistable));
+  if (!reference) throw ArchiveError("reference to an object without the interface");
 }
 
 template <typename C>
@@ -82,12 +93,15 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
       ReadPersistable(ar, &ar.m_objects[number - 1]);
     } else {
       C* object = new C();
-      ar.m_objects[number - 1].m_self = object;
+      ar.m_objects[number - 1] = {object, AnyInterface(), ArchivedType<C>()};
       DeserialiseArray(ar, object, 0, 1);
     }
   }
   reference = cref<C>();
-  if (number > 0) reference = static_cast<C*>(ar.m_objects[number - 1].m_self);
+  if (number == 0) return;
+  InputArchive::ReadObject const& object = ar.m_objects[number - 1];
+  if (object.m_type != ArchivedType<C>()) throw ArchiveError("reference to an object of another class");
+  reference = static_cast<C*>(object.m_self);
 }
 
 // A whole object: its class and its content.

@@ -9,6 +9,14 @@ void CheckKinds();
 void CheckArchives();
 void CheckSchemas();
 void CheckChanges();
+void CheckReleases();
+void CheckThreads();
+void CheckHostileReferences();
+void CheckHostileTypes();
+void CheckHostileVariants();
+void CheckHostileNumbers();
+void CheckHostileSizes();
+void CheckLimits();
 void CheckRemote();
 void CheckGraph();
 void CheckCaches();
@@ -18,7 +26,9 @@ int main()
 {
     Register_Project_check();
     for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
-                       CheckRemote, CheckGraph, CheckCaches, CheckVisiting})
+                       CheckReleases, CheckThreads, CheckHostileReferences, CheckHostileTypes, CheckHostileVariants,
+                       CheckHostileNumbers, CheckHostileSizes, CheckLimits, CheckRemote, CheckGraph, CheckCaches,
+                       CheckVisiting})
     {
         check();
     }
