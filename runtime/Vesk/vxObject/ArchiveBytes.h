@@ -4,6 +4,8 @@
 
 @import "Vesk/vxObject/Handles.h"
 
+#include <algorithm>
+#include <cstdlib>
 #include <cstring>
 #include <stdexcept>
 #include <unordered_map>
@@ -25,14 +27,57 @@ constexpr bool ArchivesSwapBytes = true;
 constexpr bool ArchivesSwapBytes = false;
 #endif
 
-// Writes into memory.
-struct Archive {
-  void Write(void const* data, std::size_t size) {
-    octet_t const* bytes = static_cast<octet_t const*>(data);
-    m_bytes.insert(m_bytes.end(), bytes, bytes + size);
+// Bytes that are appended to, mostly a few at a time; a vector where they are wanted as one.
+class ByteBuffer {
+ public:
+  ByteBuffer() {}
+  ByteBuffer(ByteBuffer const& rhs) { Append(rhs.data(), rhs.size()); }
+  ByteBuffer(ByteBuffer&& rhs) { Swap(rhs); }
+  ByteBuffer& operator=(ByteBuffer rhs) {
+    Swap(rhs);
+    return *this;
+  }
+  ~ByteBuffer() { std::free(m_data); }
+  operator xvector<octet_t>() const { return xvector<octet_t>(begin(), end()); }
+
+  void Append(void const* data, std::size_t size) {
+    if (size > m_capacity - m_size) Reserve(size);
+    if (size > 0) std::memcpy(m_data + m_size, data, size);
+    m_size += size;
   }
 
-  xvector<octet_t> m_bytes;
+  octet_t* data() { return m_data; }
+  octet_t const* data() const { return m_data; }
+  std::size_t size() const { return m_size; }
+  bool empty() const { return m_size == 0; }
+  octet_t const* begin() const { return m_data; }
+  octet_t const* end() const { return m_data + m_size; }
+  octet_t operator[](std::size_t i) const { return m_data[i]; }
+
+ private:
+  void Swap(ByteBuffer& rhs) {
+    std::swap(m_data, rhs.m_data);
+    std::swap(m_size, rhs.m_size);
+    std::swap(m_capacity, rhs.m_capacity);
+  }
+  void Reserve(std::size_t more) {
+    const std::size_t capacity = std::max(m_size + more, 2 * m_capacity + 64);
+    void* data = capacity < more ? nullptr : std::realloc(m_data, capacity);
+    if (!data) throw std::bad_alloc();
+    m_data = static_cast<octet_t*>(data);
+    m_capacity = capacity;
+  }
+
+  octet_t* m_data = nullptr;
+  std::size_t m_size = 0;
+  std::size_t m_capacity = 0;
+};
+
+// Writes into memory.
+struct Archive {
+  void Write(void const* data, std::size_t size) { m_bytes.Append(data, size); }
+
+  ByteBuffer m_bytes;
   std::unordered_map<void const*, uint32> m_objects;  // written so far, by number
   bool m_writesAddresses = false;                     // of objects, in place of the objects
   bool m_hostOrder = false;                           // scalars as the host has them: for bytes that stay in memory
@@ -136,15 +181,21 @@ inline uint32 CompactValue(int64 v) {
 
 template <typename A, typename T>
 void SerialiseVariableLengthUint(A& ar, T v) {
-  octet_t bytes[5];
-  ar.Write(bytes, WriteCompact(CompactValue(static_cast<int64>(v)), bytes) - bytes);
+  const uint32 value = CompactValue(static_cast<int64>(v));
+  octet_t bytes[5] = {static_cast<octet_t>(value)};
+  if (value < 0x80) {
+    ar.Write(bytes, 1);
+  } else {
+    ar.Write(bytes, WriteCompact(value, bytes) - bytes);
+  }
 }
 
 template <typename A>
 uint32 ReadCompact(A& ar) {
   octet_t first;
   ar.Read(&first, 1);
-  int more = 0;
+  if (first < 0x80) return first;
+  int more = 1;
   while (more < 4 && (first & 0x80 >> more)) ++more;
   uint32 value = more == 4 ? 0 : first & (0xFF >> (more + 1));
   octet_t next[4];
