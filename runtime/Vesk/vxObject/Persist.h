@@ -104,17 +104,30 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
   reference = static_cast<C*>(object.m_self);
 }
 
+// Stands ahead of a whole object; the last byte is the version of the form. No reference begins so, hence what was
+// written without it can be read as well.
+constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 1};
+
+inline void ReadObjectMark(InputArchive& ar) {
+  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
+  octet_t const* mark = ar.Take(sizeof(ObjectMark));
+  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
+  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
+}
+
 // A whole object: its class and its content.
 template <typename I>
 xvector<octet_t> WriteObject(ptr<I> const& object) {
   Archive ar;
+  ar.Write(ObjectMark, sizeof(ObjectMark));
   ar << pref<I>(object);
   return ar.m_bytes;
 }
 
 template <typename I>
-ptr<I> ReadObject(xvector<octet_t> bytes) {
-  InputArchive ar(std::move(bytes));
+ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits()) {
+  InputArchive ar(std::move(bytes), limits);
+  ReadObjectMark(ar);
   pref<I> reference;
   ar >> reference;
   return reference.Get();
