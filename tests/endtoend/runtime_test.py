@@ -52,5 +52,26 @@ def test_tour(binary):
         compile_with_clang(workspace, ["orders1", "orders", "app"], "-Wno-deprecated-declarations")
 
 
+def test_byte_order(binary):
+    """Scalars are little-endian in archives; the forced switch turns them around, both ways."""
+    need("g++")
+    settings = SETTINGS + (f'virtualTree += {{ "{ROOT / "runtime"}" }} workspaces = {{ "order.qrws" }} '
+                           'translateOnly = true')
+    with Workspace(binary, {"all.qrex": settings}) as workspace:
+        shutil.copytree(HERE / "runtime" / "tree", workspace.path("tree"))
+        workspace.run("all.qrex")
+        root = "qrexsource/x64/Debug"
+        compiler = f"g++ -std=c++17 -Wall -Werror -I{root} {root}/order/src/order.cpp {root}/Vesk/vxObject/src/vxObject.cpp"
+        plain = workspace.shell(f"{compiler} -o plain && ./plain").splitlines()
+        swapped = workspace.shell(f"{compiler} -DVESK_SWAP_SCALARS -o swapped && ./swapped").splitlines()
+        one = ",".join(["0"] * 15)
+        equal(plain, ["[254]", "[1]", "[2,1]", "[4,3,2,1]", "[254,255,255,255,255,255,255,255]", f"[1,{one}]",
+                      "[0,0,0,0,0,0,240,63]", "[2,97,98]", "[2,97,0,97,0]", "[2,1,0,2,0]", "[2,1,0,2,0]", "[1,1,0,0,0]",
+                      "[1,3,0,1,99]", "numbers[300]", "nested[k][300]"])
+        equal(swapped, ["[254]", "[1]", "[1,2]", "[1,2,3,4]", "[255,255,255,255,255,255,255,254]", f"[{one},1]",
+                        "[63,240,0,0,0,0,0,0]", "[2,97,98]", "[2,0,97,0,97]", "[2,0,1,0,2]", "[2,0,1,0,2]", "[1,0,0,0,1]",
+                        "[1,0,3,1,99]", "numbers[300]", "nested[k][300]"])
+
+
 if __name__ == "__main__":
-    run_tests([test_every_kind, test_tour])
+    run_tests([test_every_kind, test_tour, test_byte_order])

@@ -1,121 +1,91 @@
-// Archives. Scalars are their bytes, little-endian; lengths, tags and enumerations are compact: up to 7, 14, 21 or 28
-// bits in 1 to 4 bytes, anything larger in 5. Strings and containers are a length and their items. A type is written by
-// its own Serialise(Archive&), else by the function Serialise(Archive&, T) of its name space.
+// How values stand in archives. Scalars are their bytes, little-endian; strings and containers are a compact length and
+// their items, of which scalars are one block. A type is written by its own Serialise(Archive&), else by the function
+// Serialise(Archive&, T) of its name space. What is read is checked before it is assigned: a value never has contents
+// that its type does not allow.
 
-@import "Vesk/vxObject/Handles.h"
+@import "Vesk/vxObject/ArchiveBytes.h"
 
-#include <cstring>
-#include <unordered_map>
+#include <algorithm>
 
 namespace vesk {
-
-class ArchiveError : public std::runtime_error {
- public:
-  using std::runtime_error::runtime_error;
-};
-
-// Writes into memory.
-struct Archive {
-  void Write(void const* data, std::size_t size) {
-    octet_t const* bytes = static_cast<octet_t const*>(data);
-    m_bytes.insert(m_bytes.end(), bytes, bytes + size);
-  }
-
-  xvector<octet_t> m_bytes;
-  std::unordered_map<void const*, uint32> m_objects;  // written so far, by number
-  bool m_writesAddresses = false;                     // of objects, in place of the objects
-};
-
-// Reads what an Archive wrote.
-struct InputArchive {
-  InputArchive() {}
-  explicit InputArchive(xvector<octet_t> bytes) : m_bytes(std::move(bytes)) {}
-  explicit InputArchive(Archive const& archive) : m_bytes(archive.m_bytes) {}
-
-  void Read(void* data, std::size_t size) {
-    if (size > m_bytes.size() - m_position) throw ArchiveError("read beyond the end of an archive");
-    if (size > 0) std::memcpy(data, m_bytes.data() + m_position, size);
-    m_position += size;
-  }
-  std::size_t Remaining() const { return m_bytes.size() - m_position; }
-
-  struct ReadObject {
-    void* m_self;                // as cref<C> sees it
-    AnyInterface m_persistable;  // of an IPersistable object
-  };
-
-  xvector<octet_t> m_bytes;
-  std::size_t m_position = 0;
-  xvector<ReadObject> m_objects;  // read so far, by number
-};
-
-// --- Compact unsigned integers of 32 bits
-
-template <typename Out>
-Out WriteCompact(uint32 v, Out out) {
-  const int more = v < 0x80 ? 0 : v < 0x4000 ? 1 : v < 0x200000 ? 2 : v < 0x10000000 ? 3 : 4;
-  *out++ = more == 4 ? 0xF0 : static_cast<octet_t>((0xF00 >> more & 0xFF) | v >> 8 * more);
-  for (int i = more - 1; i >= 0; --i) *out++ = static_cast<octet_t>(v >> 8 * i);
-  return out;
-}
-
-inline uint32 CompactValue(int64 v) {
-  if (v > 0xFFFFFFFF) throw ArchiveError("too large for a compact integer");
-  return static_cast<uint32>(v);
-}
-
-template <typename A, typename T>
-void SerialiseVariableLengthUint(A& ar, T v) {
-  octet_t bytes[5];
-  ar.Write(bytes, WriteCompact(CompactValue(static_cast<int64>(v)), bytes) - bytes);
-}
-
-template <typename A, typename T>
-void DeserialiseVariableLengthUint(A& ar, T& v) {
-  octet_t first;
-  ar.Read(&first, 1);
-  int more = 0;
-  while (more < 4 && (first & 0x80 >> more)) ++more;
-  uint32 value = more == 4 ? 0 : first & (0xFF >> (more + 1));
-  for (int i = 0; i < more; ++i) {
-    octet_t next;
-    ar.Read(&next, 1);
-    value = value << 8 | next;
-  }
-  v = static_cast<T>(value);
-}
-
-// Into a buffer; answers its new end.
-inline octet_t* SerialiseVariableLengthInteger(octet_t* p, ssize_t v) { return WriteCompact(CompactValue(v), p); }
-
-// --- Values
 
 template <typename T>
 Archive& operator<<(Archive& ar, T const& v);
 template <typename T>
 InputArchive& operator>>(InputArchive& ar, T& v);
 
+// --- Scalars
+
+template <typename T>
+void SwapBytes(T* items, std::size_t count) {
+  octet_t* bytes = reinterpret_cast<octet_t*>(items);
+  for (std::size_t i = 0; i < count; ++i, bytes += sizeof(T)) std::reverse(bytes, bytes + sizeof(T));
+}
+
+template <typename T>
+void WriteScalars(Archive& ar, T const* items, std::size_t count) {
+  ar.Write(items, count * sizeof(T));
+  if (ArchivesSwapBytes && !ar.m_hostOrder) {
+    octet_t* end = ar.m_bytes.data() + ar.m_bytes.size();
+    for (octet_t* item = end - count * sizeof(T); item != end; item += sizeof(T)) std::reverse(item, item + sizeof(T));
+  }
+}
+
+// Not for bool, whose bytes must be looked at.
+template <typename T>
+void ReadScalars(InputArchive& ar, T* items, std::size_t count) {
+  ar.Read(items, count * sizeof(T));
+  if (ArchivesSwapBytes && !ar.m_hostOrder) SwapBytes(items, count);
+}
+
 template <typename T, typename = std::enable_if_t<IsArithmetic<T>>>
 void Serialise(Archive& ar, T v) {
-  ar.Write(&v, sizeof(v));
+  WriteScalars(ar, &v, 1);
 }
 template <typename T, typename = std::enable_if_t<IsArithmetic<T>>>
 void Deserialise(InputArchive& ar, T& v) {
-  ar.Read(&v, sizeof(v));
+  if constexpr (std::is_same<T, bool>::value) {
+    const octet_t number = *ar.Take(1);
+    if (number > 1) throw ArchiveError("not a bool");
+    v = number != 0;
+  } else {
+    ReadScalars(ar, &v, 1);
+  }
+}
+
+// --- Strings and containers
+
+// How many bytes a value takes at least, 0 where that is not known.
+template <typename T>
+constexpr std::size_t LeastBytes = IsArithmetic<T> ? sizeof(T)
+                                   : std::is_enum<T>::value || std::is_base_of<PersistentReference, T>::value ? 1
+                                   : IsContainer<T>                                                           ? 1
+                                                                                                              : 0;
+template <typename C>
+constexpr std::size_t LeastBytes<basic_xstring<C>> = 1;
+template <typename A, typename B>
+constexpr std::size_t LeastBytes<std::pair<A, B>> = LeastBytes<A> + LeastBytes<B>;
+
+inline std::size_t ReadCount(InputArchive& ar, std::size_t leastBytes) {
+  const std::size_t count = ReadCompact(ar);
+  if (leastBytes > 0 && count > ar.Remaining() / leastBytes) throw ArchiveError("more elements than an archive holds");
+  return count;
 }
 
 template <typename C>
 void Serialise(Archive& ar, basic_xstring<C> const& v) {
   SerialiseVariableLengthUint(ar, v.size());
-  ar.Write(v.data(), v.size() * sizeof(C));
+  WriteScalars(ar, v.data(), v.size());
 }
 template <typename C>
 void Deserialise(InputArchive& ar, basic_xstring<C>& v) {
-  std::size_t size;
-  DeserialiseVariableLengthUint(ar, size);
-  if (size > ar.Remaining() / sizeof(C)) throw ArchiveError("string longer than its archive");
-  v.resize(size);
-  ar.Read(&v[0], size * sizeof(C));
+  const std::size_t count = ReadCount(ar, sizeof(C));
+  if constexpr (sizeof(C) == 1) {
+    v.assign(reinterpret_cast<C const*>(ar.Take(count)), count);
+  } else {
+    v.resize(count);
+    ReadScalars(ar, &v[0], count);
+  }
 }
 
 template <typename A, typename B>
@@ -127,30 +97,132 @@ void Deserialise(InputArchive& ar, std::pair<A, B>& v) {
   ar >> v.first >> v.second;
 }
 
+template <typename T>
+constexpr bool IsFixedArray = false;
+template <typename T, ssize_t N>
+constexpr bool IsFixedArray<Array<T, N>> = true;
+
+// Scalars that stand side by side.
+template <typename T>
+constexpr bool IsBlock = false;
+template <typename T>
+constexpr bool IsBlock<xvector<T>> = IsArithmetic<T> && !std::is_same<T, bool>::value;
+template <typename T>
+constexpr bool IsBlock<DynArray<T>> = IsBlock<xvector<T>>;
+template <typename T, ssize_t N>
+constexpr bool IsBlock<Array<T, N>> = IsBlock<xvector<T>>;
+
+template <typename T>
+void ReadElement(InputArchive& ar, T& item) {
+  const std::size_t position = ar.m_position;
+  ar >> item;
+  if (LeastBytes<T> == 0 && ar.m_position == position) ar.CountEmptyElement();
+}
+
+// How many of `count` elements to make room for ahead: memory is in proportion to the bytes that are left.
+template <typename T>
+std::size_t RoomFor(InputArchive const& ar, std::size_t count) {
+  return std::min(count, 16 + 4 * (ar.Remaining() / sizeof(T)));
+}
+
+template <typename T>
+void ReadElements(InputArchive& ar, xvector<T>& v, std::size_t count) {
+  v.clear();
+  v.reserve(RoomFor<T>(ar, count));
+  for (std::size_t i = 0; i < count; ++i) {
+    if constexpr (std::is_same<T, bool>::value) {
+      bool item;
+      ar >> item;
+      v.push_back(item);
+    } else {
+      v.emplace_back();
+      ReadElement(ar, v.back());
+    }
+  }
+}
+
+template <typename T>
+void ReadElements(InputArchive& ar, DynArray<T>& v, std::size_t count) {
+  v = DynArray<T>();
+  for (std::size_t have = 0; have < count;) {
+    const std::size_t room = std::min(count, std::max(2 * have, RoomFor<T>(ar, count)));
+    v.resize(static_cast<ssize_t>(room));
+    for (; have < room; ++have) ReadElement(ar, v[static_cast<ssize_t>(have)]);
+  }
+}
+
+template <typename T, ssize_t N>
+void ReadElements(InputArchive& ar, Array<T, N>& v, std::size_t) {
+  for (T& item : v) ReadElement(ar, item);
+}
+
+template <typename T>
+void ReadElements(InputArchive& ar, T& v, std::size_t count) {
+  v.clear();
+  for (std::size_t i = 0; i < count; ++i) {
+    typename ContainerTraits<T>::element_type item = typename ContainerTraits<T>::element_type();
+    ReadElement(ar, item);
+    v.insert(v.end(), std::move(item));
+  }
+}
+
 template <typename T, typename = std::enable_if_t<IsContainer<T>>>
 void Serialise(Archive& ar, T const& v) {
   SerialiseVariableLengthUint(ar, v.size());
-  for (auto const& item : v) ar << item;
+  if constexpr (IsBlock<T>) {
+    if (v.size() > 0) WriteScalars(ar, &*v.begin(), v.size());
+  } else {
+    for (auto const& item : v) ar << item;
+  }
 }
 template <typename T, typename = std::enable_if_t<IsContainer<T>>, typename = void>
 void Deserialise(InputArchive& ar, T& v) {
-  typedef ContainerTraits<T> Traits;
-  ssize_t size;
-  DeserialiseVariableLengthUint(ar, size);
-  if constexpr (Traits::grows || Traits::keyed) {
-    v.clear();
-    for (ssize_t i = 0; i < size; ++i) {
-      typename Traits::element_type item = typename Traits::element_type();
-      ar >> item;
-      v.insert(v.end(), std::move(item));
-    }
+  const std::size_t count = ReadCount(ar, LeastBytes<typename ContainerTraits<T>::element_type>);
+  if constexpr (IsFixedArray<T>) {
+    if (count != static_cast<std::size_t>(v.size())) throw ArchiveError("fixed array of another size");
+  }
+  if constexpr (IsBlock<T>) {
+    if constexpr (!IsFixedArray<T>) v.resize(count);
+    if (count > 0) ReadScalars(ar, &*v.begin(), count);
   } else {
-    if constexpr (std::is_same<T, DynArray<typename Traits::element_type>>::value) {
-      if (size > static_cast<ssize_t>(ar.Remaining())) throw ArchiveError("array longer than its archive");
-      v.resize(size);
+    ReadElements(ar, v, count);
+  }
+}
+
+// --- Enumerations and variants: their numbers
+
+// A number without a label is refused; 0 is what a field begins with, label or not.
+template <typename E>
+void ReadEnum(InputArchive& ar, E& v) {
+  const int32 number = static_cast<int32>(ReadCompact(ar));
+  if constexpr (Detects<EnumRecordExpression, E>) {
+    if (number != 0 && !ar.m_limits.m_anyEnumNumber && !FindLabel(GetReflectedEnum<E>(), number)) {
+      throw ArchiveError("number without a label in an enumeration");
     }
-    if (size != v.size()) throw ArchiveError("fixed array of another size");
-    for (typename Traits::element_type& item : v) ar >> item;
+  }
+  v = static_cast<E>(number);
+}
+
+template <typename T>
+using VariantItemsExpression = decltype(T::_vesk_items_);
+template <typename T>
+using VariantRecordExpression = decltype(static_cast<ReflectedVariant const&>(_GetReflected(std::declval<T const*>())));
+
+// A variant's own Deserialise begins by destroying the value, and takes any tag: look at the tag ahead of it.
+template <typename T>
+void CheckVariantTag(InputArchive& ar) {
+  constexpr bool hasItems = Detects<VariantItemsExpression, T>;
+  if constexpr (hasItems || Detects<VariantRecordExpression, T>) {
+    const std::size_t position = ar.m_position;
+    const std::size_t tag = ReadCompact(ar);
+    ar.m_position = position;
+    std::size_t count;
+    if constexpr (hasItems) {
+      count = T::_vesk_items_;
+    } else {
+      count = static_cast<std::size_t>(GetReflectedVariant<T>().m_numItems);
+    }
+    if (tag >= count) throw ArchiveError("unknown tag of a variant");
   }
 }
 
@@ -179,14 +251,19 @@ Archive& operator<<(Archive& ar, T const& v) {
 
 template <typename T>
 InputArchive& operator>>(InputArchive& ar, T& v) {
+  t_reading.m_target = nullptr;
   if constexpr (std::is_enum<T>::value) {
-    uint32 value;
-    DeserialiseVariableLengthUint(ar, value);
-    v = static_cast<T>(static_cast<int32>(value));
-  } else if constexpr (Detects<DeserialiseMember, T>) {
-    v.Deserialise(ar);
-  } else {
+    ReadEnum(ar, v);
+  } else if constexpr (LeastBytes<T> > 0) {
     Deserialise(ar, v);
+  } else {
+    const ReadingScope scope(ar);
+    if constexpr (Detects<DeserialiseMember, T>) {
+      CheckVariantTag<T>(ar);
+      v.Deserialise(ar);
+    } else {
+      Deserialise(ar, v);
+    }
   }
   return ar;
 }

@@ -18,6 +18,7 @@ class EnumBase {
 
   // The position of the value among the labels, -1 for a number without one.
   ssize_t Index() const {
+    if constexpr (!Detects<ValueArrayOf, N>) return m_value >= 0 && m_value < N::LEN ? m_value : -1;
     for (ssize_t i = 0; i < N::LEN; ++i) {
       if (ValueAt(i) == m_value) return i;
     }
@@ -36,9 +37,11 @@ class EnumBase {
 
   void Serialise(Archive& ar) const { SerialiseVariableLengthUint(ar, static_cast<uint32>(m_value)); }
   void Deserialise(InputArchive& ar) {
-    uint32 value;
-    DeserialiseVariableLengthUint(ar, value);
-    m_value = static_cast<int32>(value);
+    const EnumBase value(static_cast<int32>(ReadCompact(ar)));
+    if (N::LEN > 0 && value.Index() < 0 && !ar.m_limits.m_anyEnumNumber) {
+      throw ArchiveError("number without a label in an enumeration");
+    }
+    m_value = value.m_value;
   }
   friend xostream& operator<<(xostream& os, N const& value) {
     if (ConstStringZ label = value.Label()) return os << label;

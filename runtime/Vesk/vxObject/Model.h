@@ -300,25 +300,44 @@ bool genop_DeleteFromMSet(T* object, Path const& path, E& field, K const& key) {
 
 inline void WriteRsn(XTarget const& target, Archive& ar) { SerialiseVariableLengthUint(ar, target.m_rsn); }
 
-inline void ReadRsn(XTarget& target, InputArchive& ar) {
-  DeserialiseVariableLengthUint(ar, target.m_archiveRsn);
-  if (target.m_archiveRsn > target.m_rsn) {
-    throw ArchiveError(
-        vxMakeString("archive of release " << target.m_archiveRsn << ", this is release " << target.m_rsn));
+// The release of an archive is the archive's own, for each project that wrote a part of it.
+inline void ReadRsn(XTarget const& target, InputArchive& ar) {
+  const RSN release = ReadCompact(ar);
+  if (release > target.m_rsn) {
+    throw ArchiveError(vxMakeString("archive of release " << release << ", this is release " << target.m_rsn));
   }
+  auto at = ar.m_releases.begin();
+  while (at != ar.m_releases.end() && at->first != &target) ++at;
+  if (at == ar.m_releases.end()) at = ar.m_releases.insert(at, {&target, release});
+  at->second = release;
+  // A class that is not read by `>>`: its model asks next.
+  if (t_reading.m_archive != &ar) {
+    t_reading.m_target = &target;
+    t_reading.m_release = release;
+  }
+}
+
+// The release that a model is to be read as: that of the archive being read, else the current one.
+inline RSN ReleaseBeingRead(XTarget const& target) {
+  if (std::exchange(t_reading.m_target, nullptr) == &target) return t_reading.m_release;
+  if (!t_reading.m_archive) return target.m_rsn;
+  for (auto const& [project, release] : t_reading.m_archive->m_releases) {
+    if (project == &target) return release;
+  }
+  return target.m_rsn;
 }
 
 }  // namespace vesk
 
 // In one source of each project: X is the project's folder with `_` for each `/`, RELEASE the release number that its
-// models write. Archives begin with it, and what is read tells the models the release of the archive.
+// models write. Archives of classes begin with it; models are read as of the release that their archive names.
 #define vxDefineTarget(X, RELEASE)                                                 \
   namespace vesk {                                                                 \
   XTarget* X##_GetXTarget() {                                                      \
-    static XTarget target = {#X, RELEASE, RELEASE};                                \
+    static XTarget target = {#X, RELEASE};                                         \
     return &target;                                                                \
   }                                                                                \
-  RSN X##_GetModelRsn() { return X##_GetXTarget()->m_archiveRsn; }                 \
+  RSN X##_GetModelRsn() { return ReleaseBeingRead(*X##_GetXTarget()); }            \
   void X##_WriteDataSourceRsn(Archive& ar) { WriteRsn(*X##_GetXTarget(), ar); }    \
   void X##_ReadDataSourceRsn(InputArchive& ar) { ReadRsn(*X##_GetXTarget(), ar); } \
   }

@@ -12,9 +12,9 @@ class openvariant {
   template <typename U, typename = std::enable_if_t<!std::is_same<U, openvariant>::value>>
   openvariant(U const& value) : m_ops(&GetTypeOps<U>()), m_value(Clone(m_ops, &value)) {}
   openvariant(openvariant const& rhs) : m_ops(rhs.m_ops), m_value(Clone(m_ops, rhs.m_value)) {}
+  openvariant(openvariant&& rhs) { Swap(rhs); }
   openvariant& operator=(openvariant rhs) {
-    std::swap(m_ops, rhs.m_ops);
-    std::swap(m_value, rhs.m_value);
+    Swap(rhs);
     return *this;
   }
   ~openvariant() {
@@ -35,31 +35,36 @@ class openvariant {
   }
 
   friend bool operator==(openvariant const& a, openvariant const& b) {
-    return a.m_ops == b.m_ops && (!a.m_value || a.m_ops->m_equal(a.m_value, b.m_value));
+    if (a.m_ops != b.m_ops || !a.m_value) return a.m_ops == b.m_ops;
+    return a.m_ops->m_equal ? a.m_ops->m_equal(a.m_value, b.m_value) : a.m_value == b.m_value;
   }
   friend bool operator!=(openvariant const& a, openvariant const& b) { return !(a == b); }
   friend bool operator<(openvariant const& a, openvariant const& b) {
     if (a.m_ops != b.m_ops) return a.m_ops < b.m_ops;
-    return a.m_value && a.m_ops->m_less(a.m_value, b.m_value);
+    if (!a.m_value) return false;
+    return a.m_ops->m_less ? a.m_ops->m_less(a.m_value, b.m_value) : a.m_value < b.m_value;
   }
   friend xostream& operator<<(xostream& os, openvariant const& x) {
-    if (x.m_value) x.m_ops->m_print(os, x.m_value);
+    if (!x.m_value) return os;
+    if (!x.m_ops->m_print) return os << '?';
+    x.m_ops->m_print(os, x.m_value);
     return os;
   }
 
   void Serialise(Archive& ar) const {
+    if (m_value && !m_ops->m_serialise) throw ArchiveError("type of an openvariant cannot be archived");
     ar << NameOf(m_ops);
     if (m_value) m_ops->m_serialise(ar, m_value, 0, 1);
   }
   void Deserialise(InputArchive& ar) {
     xstring name;
     ar >> name;
-    *this = openvariant();
-    if (name.empty()) return;
-    m_ops = OpsOf(name);
-    m_value = ::operator new(m_ops->m_size);
-    m_ops->m_construct(m_value, 0, 1);
-    m_ops->m_deserialise(ar, m_value, 0, 1);
+    openvariant read;
+    if (!name.empty()) {
+      read = DefaultOf(OpsOf(name));
+      read.m_ops->m_deserialise(ar, read.m_value, 0, 1);
+    }
+    Swap(read);
   }
   void VisitObjects(IObjectVisitor& v) const {
     if (m_value && m_ops->m_visitObjects) m_ops->m_visitObjects(v, m_value, 0, 1);
@@ -69,11 +74,29 @@ class openvariant {
   }
 
  private:
+  typedef std::unique_ptr<void, void (*)(void*)> Memory;
+
+  void Swap(openvariant& rhs) {
+    std::swap(m_ops, rhs.m_ops);
+    std::swap(m_value, rhs.m_value);
+  }
+  static Memory Allocate(TypeOps const& ops) {
+    return Memory(::operator new(ops.m_size), [](void* memory) { ::operator delete(memory); });
+  }
+  static openvariant DefaultOf(TypeOps const& ops) {
+    Memory memory = Allocate(ops);
+    ops.m_construct(memory.get(), 0, 1);
+    openvariant made;
+    made.m_ops = &ops;
+    made.m_value = memory.release();
+    return made;
+  }
   static void* Clone(TypeOps const* ops, void const* value) {
     if (!value) return nullptr;
-    void* copy = ::operator new(ops->m_size);
-    ops->m_copyConstruct(copy, 0, value, 0, 1);
-    return copy;
+    if (!ops->m_copyConstruct || !ops->m_destruct) throw std::logic_error("type of an openvariant cannot be copied");
+    Memory memory = Allocate(*ops);
+    ops->m_copyConstruct(memory.get(), 0, value, 0, 1);
+    return memory.release();
   }
   static xstring NameOf(TypeOps const* ops) {
     if (!ops) return xstring();
@@ -88,12 +111,21 @@ class openvariant {
     }
     throw ArchiveError("type of an openvariant is not registered");
   }
-  static TypeOps const* OpsOf(xstring const& name) {
+  static TypeOps const* FindOps(xstring const& name) {
     const auto at = TypeOpsTable().find(name);
     if (at != TypeOpsTable().end()) return at->second;
     if (ReflectedClass const* record = Find<ReflectedClass>(name)) return &record->m_ops;
     if (ReflectedVariant const* record = Find<ReflectedVariant>(name)) return &record->m_ops;
-    throw ArchiveError("type of an openvariant is not registered: " + name);
+    return nullptr;
+  }
+  // A name in an archive may be that of any registered type, also of one that no openvariant can hold.
+  static TypeOps const& OpsOf(xstring const& name) {
+    TypeOps const* ops = FindOps(name);
+    if (!ops) throw ArchiveError("type of an openvariant is not registered: " + name);
+    if (!ops->m_construct || !ops->m_copyConstruct || !ops->m_destruct || !ops->m_deserialise) {
+      throw ArchiveError("type cannot be the value of an openvariant: " + name);
+    }
+    return *ops;
   }
 
   TypeOps const* m_ops = nullptr;

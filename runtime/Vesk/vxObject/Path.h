@@ -43,7 +43,10 @@ class Path {
 
 // Writes a path whose keys have no fixed size. A reference as a key is the address of its object.
 struct FieldPathArchive : Archive {
-  FieldPathArchive() { m_writesAddresses = true; }
+  FieldPathArchive() {
+    m_writesAddresses = true;
+    m_hostOrder = true;
+  }
   void InitPath(Path& path) const {
     std::copy(m_bytes.begin(), m_bytes.end(), path.InitHeapBuffer(static_cast<ssize_t>(m_bytes.size())));
   }
@@ -54,7 +57,10 @@ struct FieldPathArchive : Archive {
 class PathPrinter {
  public:
   PathPrinter(xostream& os, Path const& path)
-      : m_os(os), m_bytes(xvector<octet_t>(path.Data(), path.Data() + path.Size())) {}
+      : m_os(os), m_bytes(xvector<octet_t>(path.Data(), path.Data() + path.Size())) {
+    m_bytes.m_hostOrder = true;
+    m_bytes.m_limits.m_anyEnumNumber = true;
+  }
 
   void Print(ReflectedClass const& record) {
     ReflectedModelField const* field = ReadField(record);

@@ -27,8 +27,17 @@ inline bool ReadObjectNumber(InputArchive& ar, std::size_t& number) {
   DeserialiseVariableLengthUint(ar, number);
   if (number <= ar.m_objects.size()) return false;
   if (number != ar.m_objects.size() + 1) throw ArchiveError("reference to an object that is not in the archive");
-  ar.m_objects.push_back({nullptr, AnyInterface()});
+  if (number > ar.m_limits.m_objects) throw ArchiveError("too many objects in an archive");
+  ar.m_objects.push_back({nullptr, AnyInterface(), nullptr});
   return true;
+}
+
+// What tells the class of an object in an archive from others: its record, else the address of something of its own.
+template <typename C>
+void const* ArchivedType() {
+  static const char mark = 0;
+  void const* record = RecordOf<std::remove_const_t<C>>();
+  return record ? record : &mark;
 }
 
 inline void WritePersistable(Archive& ar, ptr<IPersistable> const& object) {
@@ -46,7 +55,7 @@ inline ptr<IPersistable> ReadPersistable(InputArchive& ar, InputArchive::ReadObj
   if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
   const ptr<IPersistable> object = QueryInterface<IPersistable>(record->m_create());
   if (!object) throw ArchiveError("not persistable: " + name);
-  if (place) *place = {object.Object(), object.Any()};
+  if (place) *place = {object.Object(), object.Any(), record};
   object->Deserialise(ar);
   return object;
 }
@@ -61,7 +70,9 @@ void Deserialise(InputArchive& ar, pref<I>& reference) {
   std::size_t number;
   if (ReadObjectNumber(ar, number)) ReadPersistable(ar, &ar.m_objects[number - 1]);
   reference = pref<I>();
-  if (number > 0) reference = QueryInterface<I>(ptr<IPersistable>(ar.m_objects[number - 1].m_persistable));
+  if (number == 0) return;
+  reference = QueryInterface<I>(ptr<IPersistable>(ar.m_objects[number - 1].m_persistable));
+  if (!reference) throw ArchiveError("reference to an object without the interface");
 }
 
 template <typename C>
@@ -82,25 +93,41 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
       ReadPersistable(ar, &ar.m_objects[number - 1]);
     } else {
       C* object = new C();
-      ar.m_objects[number - 1].m_self = object;
+      ar.m_objects[number - 1] = {object, AnyInterface(), ArchivedType<C>()};
       DeserialiseArray(ar, object, 0, 1);
     }
   }
   reference = cref<C>();
-  if (number > 0) reference = static_cast<C*>(ar.m_objects[number - 1].m_self);
+  if (number == 0) return;
+  InputArchive::ReadObject const& object = ar.m_objects[number - 1];
+  if (object.m_type != ArchivedType<C>()) throw ArchiveError("reference to an object of another class");
+  reference = static_cast<C*>(object.m_self);
+}
+
+// Stands ahead of a whole object; the last byte is the version of the form. No reference begins so, hence what was
+// written without it can be read as well.
+constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 1};
+
+inline void ReadObjectMark(InputArchive& ar) {
+  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
+  octet_t const* mark = ar.Take(sizeof(ObjectMark));
+  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
+  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
 }
 
 // A whole object: its class and its content.
 template <typename I>
 xvector<octet_t> WriteObject(ptr<I> const& object) {
   Archive ar;
+  ar.Write(ObjectMark, sizeof(ObjectMark));
   ar << pref<I>(object);
   return ar.m_bytes;
 }
 
 template <typename I>
-ptr<I> ReadObject(xvector<octet_t> bytes) {
-  InputArchive ar(std::move(bytes));
+ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits()) {
+  InputArchive ar(std::move(bytes), limits);
+  ReadObjectMark(ar);
   pref<I> reference;
   ar >> reference;
   return reference.Get();

@@ -91,7 +91,8 @@ using vesk::uint8;
 #define CONST_ATTRIB_CAST(CLS, MEMBER) \
   (reinterpret_cast<CLS const*>(reinterpret_cast<char const*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
 
-// The storage of a variant: as large as its largest item. The number in the name is that of the items.
+// The storage of a variant: as large as its largest item. The number in the name is that of the items; it is kept behind
+// the storage, so that whoever reads a tag knows which there are.
 namespace vesk {
 template <typename... Sizes>
 constexpr std::size_t MaxSize(Sizes... sizes) {
@@ -106,7 +107,12 @@ constexpr std::size_t MaxSize(Sizes... sizes) {
     @let int items = 1
     @while (items <= 64)
     {
-        #define VESK_MAX@@@(items)(...) ::vesk::MaxSize(__VA_ARGS__)
+        #define VESK_MAX@@@(items)(...) \
+          ::vesk::MaxSize(__VA_ARGS__)]; \
+          public: \
+          enum { _vesk_items_ = @@@(items) }; \
+          private: \
+          typedef ::vesk::octet_t _vesk_end_[1
         @let items = items + 1
     }
 }

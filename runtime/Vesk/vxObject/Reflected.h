@@ -267,11 +267,18 @@ ReflectedFunctor const& GetReflectedFunctor() {
   return _GetReflected(static_cast<T const*>(nullptr));
 }
 
+// Null for a number without a label.
+inline ConstStringZ FindLabel(ReflectedEnum const& record, int32 number) {
+  if (!record.m_values) return number >= 0 && number < record.m_numLabels ? record.m_labels[number] : nullptr;
+  for (ssize_t i = 0; i < record.m_numLabels; ++i) {
+    if (record.m_values[i] == number) return record.m_labels[i];
+  }
+  return nullptr;
+}
+
 // An enumeration with a record prints its label.
 inline xostream& PrintEnum(xostream& os, ReflectedEnum const* record, int32 number) {
-  for (ssize_t i = 0; record && i < record->m_numLabels; ++i) {
-    if ((record->m_values ? record->m_values[i] : i) == number) return os << record->m_labels[i];
-  }
+  if (ConstStringZ label = record ? FindLabel(*record, number) : nullptr) return os << label;
   return os << number;
 }
 

@@ -9,8 +9,7 @@ namespace vesk {
 // A project at run time: vxDefineTarget (Model.h) makes it.
 struct XTarget {
   ConstStringZ m_name;
-  RSN m_rsn;         // the release that it writes
-  RSN m_archiveRsn;  // the release of the archive being read
+  RSN m_rsn;  // the release that it writes
 };
 
 enum NSE { NSE_OK, NSE_ALREADY_DEFINED };

@@ -87,7 +87,15 @@ $class+ Doc isa IDoc : model
         2: - pages + lines + marks + wide + grid + notes + bytes + sizes + tags + docs + fixedDocs + list + size + next
         3: + total + dynamic
     }
-    $evolve { lines (pages) { lines = vesk::xvector<int32>(pages); } total (count) { total = count; } }
+    $evolve
+    {
+        lines (pages)
+        {
+            if (pages < 0 || pages > 1000) throw vesk::ArchiveError("number of pages");
+            lines = vesk::xvector<int32>(pages);
+        }
+        total (count) { total = count; }
+    }
 }
 {
 };

@@ -9,6 +9,14 @@ void CheckKinds();
 void CheckArchives();
 void CheckSchemas();
 void CheckChanges();
+void CheckReleases();
+void CheckThreads();
+void CheckHostileReferences();
+void CheckHostileTypes();
+void CheckHostileVariants();
+void CheckHostileNumbers();
+void CheckHostileSizes();
+void CheckLimits();
 void CheckRemote();
 void CheckRemoteErrors();
 void CheckRemoteMessages();
@@ -25,8 +33,10 @@ int main()
 {
     Register_Project_check();
     for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
-                       CheckRemote, CheckRemoteErrors, CheckRemoteMessages, CheckRemoteAnswers, CheckJsonBothWays,
-                       CheckJsonErrors, CheckJsonObjects, CheckAccess, CheckGraph, CheckCaches, CheckVisiting})
+                       CheckReleases, CheckThreads, CheckHostileReferences, CheckHostileTypes, CheckHostileVariants,
+                       CheckHostileNumbers, CheckHostileSizes, CheckLimits, CheckRemote, CheckRemoteErrors,
+                       CheckRemoteMessages, CheckRemoteAnswers, CheckJsonBothWays, CheckJsonErrors, CheckJsonObjects,
+                       CheckAccess, CheckGraph, CheckCaches, CheckVisiting})
     {
         check();
     }

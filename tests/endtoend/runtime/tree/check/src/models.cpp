@@ -90,7 +90,8 @@ void CheckSchemas()
     next.next = &doc;
     doc.next = &next;
     doc.list.push_back(vesk::pref<IDoc>(&doc));
-    const vesk::ptr<IDoc> copy = vesk::ReadObject<IDoc>(vesk::WriteObject(vesk::ptr<IDoc>(&next)));
+    vesk::xvector<vesk::octet_t> whole = vesk::WriteObject(vesk::ptr<IDoc>(&next));
+    const vesk::ptr<IDoc> copy = vesk::ReadObject<IDoc>(whole);
     Doc& read = *static_cast<Doc*>(copy.Object());
     Doc& second = *static_cast<Doc*>(read.next.Get().Object());
     CHECK(vxMakeString(read.title << second.title), "NT");
@@ -99,6 +100,15 @@ void CheckSchemas()
     CHECK(second.list.read()[0].Object() == &second, true);
     second.DestroyObject();
     read.DestroyObject();
+
+    // Behind a mark and the version of the form; what was written without them is read as well.
+    CHECK(vesk::xvector<vesk::octet_t>(whole.begin(), whole.begin() + 4), "[255,118,120,1]");
+    Doc alone;
+    const vesk::ptr<IDoc> unmarked = vesk::ReadObject<IDoc>(Written(vesk::pref<IDoc>(&alone)));
+    CHECK(bool(unmarked), true);
+    unmarked->DestroyObject();
+    whole[3] = 2;
+    CHECK(Throws([&] { vesk::ReadObject<IDoc>(whole); }), true);
 }
 
 void CheckChanges()

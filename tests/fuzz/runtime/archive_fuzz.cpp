@@ -1,0 +1,143 @@
+// Archives of every kind. The first byte of an input says as what the rest is read; an archive is read or refused with
+// an ArchiveError, and what was read is printed, compared, copied, and written again. What is written of it is read
+// back as the same bytes.
+#include <fstream>
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "kinds/graph.h"
+#include "kinds/kinds.h"
+#include "kinds/models.h"
+
+void Register_Project_kinds();
+
+namespace {
+
+using Bytes = vesk::xvector<vesk::octet_t>;
+
+// The objects that an archive made are the reader's to destroy.
+void DestroyObjects(vesk::InputArchive& ar) {
+  for (vesk::InputArchive::ReadObject const& object : ar.m_objects) {
+    const vesk::ptr<vesk::IPersistable> persistable(object.m_persistable);
+    if (persistable) {
+      persistable->DestroyObject();
+    } else if (object.m_type == vesk::ArchivedType<kinds::Size>()) {
+      delete static_cast<kinds::Size*>(object.m_self);
+    }
+  }
+}
+
+template <typename T>
+Bytes Written(T const& value) {
+  vesk::Archive ar;
+  ar << value;
+  return ar.m_bytes;
+}
+
+// What lies behind references is written too, but without a plain order of addresses: only values are written twice.
+template <typename T, bool HasReferences>
+void ReadAndUse(Bytes bytes) {
+  vesk::InputArchive ar(std::move(bytes));
+  T value = T();
+  try {
+    ar >> value;
+    const T copy = value;
+    if constexpr (vesk::Detects<vesk::EqualExpression, T>) (void)(copy == value);
+    if constexpr (vesk::Detects<vesk::LessExpression, T>) (void)(copy < value);
+    if constexpr (vesk::Detects<vesk::PrintExpression, T>) (void)vxMakeString(value);
+    const Bytes written = Written(value);
+    if constexpr (!HasReferences) {
+      vesk::InputArchive again(written);
+      T reread = T();
+      again >> reread;
+      if (again.Remaining() > 0 || Written(reread) != written) std::abort();
+    }
+  } catch (vesk::ArchiveError const&) {
+  }
+  DestroyObjects(ar);
+}
+
+void ReadObjectGraph(Bytes bytes) {
+  vesk::InputArchive ar(std::move(bytes));
+  vesk::pref<kinds::IDoc> root;
+  try {
+    ar >> root;
+    if (root) (void)Written(root);
+  } catch (vesk::ArchiveError const&) {
+  }
+  DestroyObjects(ar);
+}
+
+using Read = void (*)(Bytes);
+const Read kKinds[] = {
+    ReadAndUse<kinds::Everything, true>,
+    ReadAndUse<kinds::Size, false>,
+    ReadAndUse<kinds::Value, false>,
+    ReadAndUse<kinds::Tree, false>,
+    ReadAndUse<kinds::Nothing, false>,
+    ReadAndUse<vesk::openvariant<vesk::int32>, true>,
+    ReadAndUse<kinds::Doc, true>,
+    ReadAndUse<kinds::NoOps, false>,
+    ReadAndUse<vesk::xvector<kinds::None>, false>,
+    ReadAndUse<vesk::xmap<vesk::string8, vesk::xvector<kinds::Size>>, false>,
+    ReadAndUse<vesk::xlist<vesk::xset<vesk::int16>>, false>,
+    ReadAndUse<vesk::DynArray<vesk::string16>, false>,
+    ReadAndUse<vesk::xvector<shapes::Colour>, false>,
+    ReadAndUse<vesk::xvector<vesk::cref<kinds::Size>>, true>,
+    ReadObjectGraph,
+};
+constexpr std::size_t kKindCount = sizeof(kKinds) / sizeof(*kKinds);
+
+// An archive of each kind, to begin with.
+std::vector<Bytes> Seeds() {
+  kinds::Doc doc, next;
+  doc.title = "title";
+  doc.next = &next;
+  next.next = &doc;
+  doc.list.push_back(vesk::pref<kinds::IDoc>(&next));
+  kinds::Size size(4);
+  kinds::Everything all;
+  all.reference = &size;
+  all.any = vesk::string8("any");
+  all.docs.push_back(vesk::pref<kinds::IDoc>(&doc));
+  const kinds::Tree leaf(vesk::int32(7));
+  kinds::Tree::node node;
+  node.branches = {leaf, leaf};
+  const Bytes numbers = Written(vesk::xvector<vesk::int32>{1, 2, 3});
+  return {Written(all),
+          Written(size),
+          Written(kinds::Value(kinds::Value::list({1, 2}))),
+          Written(kinds::Tree(node)),
+          {1},
+          Written(vesk::openvariant<vesk::int32>(size)),
+          Written(doc),
+          Written(kinds::NoOps()),
+          numbers,
+          Written(vesk::xmap<vesk::string8, vesk::xvector<kinds::Size>>{{"key", {size}}}),
+          Written(vesk::xlist<vesk::xset<vesk::int16>>{{1, 2}}),
+          Written(vesk::DynArray<vesk::string16>{vesk::string16(2, 'a')}),
+          {1, 5},
+          Written(vesk::xvector<vesk::cref<kinds::Size>>{&size, &size}),
+          Written(vesk::pref<kinds::IDoc>(&doc))};
+}
+
+}  // namespace
+
+// `--seeds FOLDER` writes them.
+extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) {
+  Register_Project_kinds();
+  if (*count < 3 || std::string((*arguments)[1]) != "--seeds") return 0;
+  const std::vector<Bytes> seeds = Seeds();
+  for (std::size_t kind = 0; kind < seeds.size(); ++kind) {
+    std::ofstream file((*arguments)[2] + ("/seed" + std::to_string(kind)), std::ios::binary);
+    file.put(static_cast<char>(kind));
+    file.write(reinterpret_cast<char const*>(seeds[kind].data()), static_cast<std::streamsize>(seeds[kind].size()));
+  }
+  std::exit(0);
+}
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  if (size > 0) kKinds[data[0] % kKindCount](Bytes(data + 1, data + size));
+  return 0;
+}
