@@ -9,6 +9,7 @@
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
+#include "translator/file/translate_file.h"
 
 namespace qrex {
 
@@ -147,7 +148,7 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.translated) {
     file.needsWriting = TailsMoved(file);
   }
-  if (file.needsWriting && (kind == FileKind::H || isWritten)) file.WriteGeneratedFile();
+  if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
   if (RunsTools() && isBuild && IsVisualCpp(settings.compiler) && settings.compiler != CompilerKind::vc6 &&
       kind == FileKind::Rc) {
     result = CompileResourceIfStale(file);
@@ -168,7 +169,7 @@ bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
   int64_t& objectTime = known->second;
   if (isNew) objectTime = times.LastWriteTime(object);
   if (LatestTargetTime(*this, file) < objectTime) return true;
-  file.WriteGeneratedFile();
+  BringUpToDate(file);
   const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
   objectTime = times.LastWriteTime(object);
   return compiled;

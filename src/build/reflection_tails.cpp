@@ -1,5 +1,7 @@
 #include "build/reflection_tails.h"
 
+#include "translator/file/translate_file.h"
+
 namespace qrex {
 
 namespace {
@@ -46,7 +48,7 @@ class TailWalk {
 // is translated.
 bool HasTail(ScannedFile& header) {
   if (header.hasDeclarations) return true;
-  header.WriteGeneratedFile();
+  BringUpToDate(header);
   return header.HasTail();
 }
 

@@ -3,7 +3,7 @@
 
 #include <string>
 
-#include "driver/config_settings.h"
+#include "workspace/config_settings.h"
 
 namespace qrex {
 

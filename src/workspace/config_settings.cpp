@@ -1,4 +1,4 @@
-#include "driver/config_settings.h"
+#include "workspace/config_settings.h"
 
 #include <algorithm>
 

@@ -8,9 +8,9 @@
 #include <unordered_map>
 #include <vector>
 
-#include "driver/config_settings.h"
 #include "macro/mpfw_parser.h"
 #include "text/guid.h"
+#include "workspace/config_settings.h"
 
 namespace qrex {
 

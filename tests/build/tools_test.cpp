@@ -15,6 +15,7 @@
 #include "text/numbers.h"
 #include "text/paths.h"
 #include "text/trace.h"
+#include "translator/file/translate_file.h"
 #include "workspace/switch_blocks.h"
 
 namespace qrex {
@@ -345,7 +346,7 @@ TEST_F(ToolsTest, MessagesPointAtTheSource) {
   builder->GetScannedFile(unused);
   ScannedFile& scanned = builder->GetScannedFile(source);
   scanned.needsWriting = true;
-  scanned.WriteGeneratedFile();
+  BringUpToDate(scanned);
   trace.clear();
   std::string folder;
   FullPathOf(".", folder);

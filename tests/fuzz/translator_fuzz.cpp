@@ -1,5 +1,6 @@
 // The translator over a header, then over the source that registers what the header declares.
 #include "fuzz/fuzz_world.h"
+#include "translator/file/translate_file.h"
 
 using namespace qrex;
 
@@ -14,7 +15,7 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     world.workspace->CheckFileReferences();
     world.App().CollectFiles();
     ProjectBuilder builder(world.settings, world.App(), *world.App().configs.front());
-    builder.GetScannedFile(*builder.FindFile("app/src/app.cpp")).WriteGeneratedFile();
+    BringUpToDate(builder.GetScannedFile(*builder.FindFile("app/src/app.cpp")));
   });
   return 0;
 }

@@ -170,7 +170,7 @@ TEST_F(RecordsTest, TokenEquivalentOutputStays) {
     file.translated = false;
     file.needsWriting = true;
     ReplaceFile(file.SourcePath(), text);
-    file.WriteGeneratedFile();
+    BringUpToDate(file);
     EXPECT_FALSE(file.needsWriting);
     std::string written;
     ReadWholeFile(written, host->TranslatedPath(file));

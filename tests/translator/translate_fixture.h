@@ -17,8 +17,8 @@
 #include "text/numbers.h"
 #include "text/paths.h"
 #include "text/trace.h"
+#include "translator/file/translate_file.h"
 #include "translator/reader/qrex_parser.h"
-#include "translator/symbols/scanned_file.h"
 #include "workspace/workspace.h"
 
 namespace qrex {

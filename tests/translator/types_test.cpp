@@ -2,6 +2,7 @@
 
 #include "translator/emit/byte_code.h"
 #include "translator/emit/emit.h"
+#include "translator/file/keywords.h"
 #include "translator/translate_fixture.h"
 
 namespace qrex {
@@ -32,7 +33,7 @@ class TypesTest : public TranslateTest {
     ScannedFile& file = Scanned("t.cpp");
     QrexParserOutputStream stream(target, file.lineTable, range, map);
     TextWriter out(stream);
-    QrexParser parser(file, stream, out, range);
+    QrexParser parser(file, stream, out, range, AllKeywords());
     try {
       read(parser);
       return "";

@@ -4,6 +4,7 @@
 #include "translator/class/class_members.h"
 #include "translator/emit/emit.h"
 #include "translator/reader/code_block.h"
+#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
 

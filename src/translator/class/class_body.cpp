@@ -1,10 +1,9 @@
-// The scanner of class bodies: text is copied, `$` items are replaced.
+#include "translator/class/class_body.h"
 
 #include <algorithm>
 
-#include "translator/class/class_parser.h"
-#include "translator/emit/emit.h"
-#include "translator/file/keywords.h"
+#include "translator/declared/class_def.h"
+#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
 
@@ -21,7 +20,7 @@ void DealWithTextTo(QrexParser& parser, const ClassDef& def, const char* positio
 void ParseItem(QrexParser& parser, ClassDef& def) {
   DealWithTextTo(parser, def, parser.current.text.begin);
   parser.Advance();
-  for (const ClassKeyword& keyword : ClassLevelKeywords()) {
+  for (const ClassKeyword& keyword : parser.Keywords().classLevel) {
     if (!parser.Is(keyword.word)) continue;
     keyword.parse(parser, def);
     if (!keyword.advancesItself) parser.Advance();
@@ -90,59 +89,6 @@ void ParseFieldOrMethod(QrexParser& parser, ClassDef& def) {
   }
   def.m_fields.push_back({name, member.returnType, FieldKind::Plain, def.m_reflected});
   parser.DropBehindCurrent();
-}
-
-const QualifierWord* FindQualifierWord(std::string_view word) {
-  using Q = ClassQualifiers;
-  static constexpr QualifierWord kWords[] = {
-      {"dc", &Q::dc, true, false},
-      {"abstract", &Q::abstract, false, false},
-      {"copy", &Q::copy, true, true},
-      {"compare", &Q::compare, true, true},
-      {"print", &Q::print, true, true},
-      {"ser", &Q::ser, true, true},
-      {"os", &Q::os, false, true},
-      {"ar", &Q::ar, false, true},
-      {"extern", &Q::extern_, false, true},
-      {"passbyvalue", &Q::passbyvalue, true, true},
-      {"returnbyvalue", &Q::returnbyvalue, true, true},
-      {"multiline", &Q::multiline, false, true},
-      {"traits", &Q::traits, false, false},
-      {"genop", &Q::genop, false, false},
-      {"rod", &Q::rod, false, false},
-  };
-  const auto* found = std::find_if(std::begin(kWords), std::end(kWords),
-                                   [&](const QualifierWord& candidate) { return candidate.word == word; });
-  return found == std::end(kWords) ? nullptr : found;
-}
-
-bool ParseQualifierList(QrexParser& parser, ClassDef& def) {
-  bool redundant = false;
-  for (; !parser.Accept(kShiftRight); parser.Advance()) {
-    const bool on = !parser.Accept(kMinus);
-    if (const QualifierWord* word = FindQualifierWord(parser.current.text.View())) {
-      if (!on && word->word == "dc" && def.IsPureModel()) parser.Fail("Qualifier <<-dc>> invalid for a $model");
-      def.qualifiers.*word->state = on ? TriState::On : TriState::Off;
-      redundant = redundant || word->needsReflection;
-    } else if (parser.Is("nested")) {
-      def.m_nested = true;
-    } else if (parser.Is("reflect")) {
-      if (on && def.m_nested) parser.Fail("Qualifier <<reflect>> invalid for a nested type");
-      def.m_reflected = on;
-      if (on) {
-        def.m_strict = true;
-      } else {
-        def.m_registered = false;
-      }
-    } else if (parser.Is("register")) {
-      if (on && def.m_nested) parser.Fail("Qualifier <<register>> invalid for a nested type");
-      def.m_registered = on;
-      if (on) def.m_reflected = def.m_strict = true;
-    } else {
-      parser.Fail("Unrecognised qualifier << " + Printed(parser.current) + " >> on " + PrintedElement(def));
-    }
-  }
-  return redundant;
 }
 
 }  // namespace qrex

@@ -4,7 +4,6 @@
 
 #include <algorithm>
 
-#include "translator/class/class_parser.h"
 #include "translator/emit/emit.h"
 #include "translator/interface/interface_def.h"
 #include "translator/model/model.h"
@@ -45,7 +44,7 @@ void WriteArchiveMembers(TextWriter& out, const ClassDef& def) {
 void WriteQueryInterface(TextWriter& out, const ClassDef& def, std::string_view scope) {
   out << "\nvesk::AnyInterface " << scope << "QueryInterface(const vesk::ReflectedInterface& _ri)\n";
   Block body(out);
-  for (const InterfaceDef* interface : def.AllInterfaces()) {
+  for (const InterfaceDef* interface : AllInterfaces(def)) {
     if (!interface->m_reflected) continue;
     WriteText(out,
               "if (&_ri == &vesk::GetReflectedInterface<$0 >()) { vesk::ptr<$0> p(this); "
@@ -239,6 +238,27 @@ void ClassDef::WriteExtraTraits(TextWriter& out) const {
     if (std::find(m_interfaces.begin(), m_interfaces.end(), interface) == m_interfaces.end()) {
       writeImplements("indirectly", *interface);
     }
+  }
+}
+
+std::vector<const InterfaceDef*> AllInterfaces(const ClassDef& def) {
+  std::vector<const InterfaceDef*> all;
+  for (const InterfaceDef* interface : def.m_interfaces) {
+    for (const InterfaceDef::FlatBase& flat : interface->FlattenedBases()) all.push_back(flat.base);
+    all.push_back(interface);
+  }
+  return all;
+}
+
+void WriteForwardDeclaration(TextWriter& out, const ClassDef& def) {
+  out << def.TemplatePrefix() << def.StructWord() << def.name << ";\n";
+}
+
+void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def) {
+  if (!def.m_reflected) return;
+  if (def.IsMixin() || def.IsTemplate()) return WriteGetTypeOps(out, def);
+  for (std::string_view text : {"vesk::ReflectedClass const& _GetReflected(", "vesk::TypeOps const& _GetTypeOps("}) {
+    out << ExportPrefix(def) << text << def.GetTemplateClassName() << " const*);\n";
   }
 }
 

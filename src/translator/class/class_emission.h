@@ -2,7 +2,7 @@
 // predicate of ClassDef, so that traits, TypeOps and members agree.
 #pragma once
 
-#include <string>
+#include <vector>
 
 #include "translator/declared/class_def.h"
 
@@ -15,6 +15,11 @@ void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def);  // QueryI
 void WriteGetReflected(TextWriter& out, const ClassDef& def);
 void WriteGetTypeOps(TextWriter& out, const ClassDef& def);
 
+void WriteForwardDeclaration(TextWriter& out, const ClassDef& def);
+void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def);
+
+// The interfaces of `isa` with their flattened bases ahead of each, as QueryInterface walks them.
+std::vector<const InterfaceDef*> AllInterfaces(const ClassDef& def);
 bool HasCreateFunction(const ClassDef& def);
 
 }  // namespace qrex

@@ -1,10 +1,12 @@
 #include "translator/class/class_head.h"
 
-#include "translator/class/class_parser.h"
+#include "translator/class/class_emission.h"
 #include "translator/class/mixin_list.h"
 #include "translator/emit/emit.h"
 #include "translator/emit/records.h"
+#include "translator/interface/interface_def.h"
 #include "translator/model/model.h"
+#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
 

@@ -5,10 +5,10 @@
 #include <vector>
 
 #include "translator/declared/class_def.h"
-#include "translator/interface/interface_def.h"
-#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
+
+class QrexParser;
 
 void ParseIsaList(QrexParser& parser, ClassDef& def);
 // One comma-separated list of bases; those that resolve to a class of this file's view are appended.

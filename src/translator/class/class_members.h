@@ -3,9 +3,10 @@
 #pragma once
 
 #include "translator/declared/class_def.h"
-#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
+
+class QrexParser;
 
 void ParseDep(QrexParser& parser, ClassDef& def);
 void ParseIndep(QrexParser& parser, ClassDef& def);

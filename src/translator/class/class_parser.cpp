@@ -2,12 +2,16 @@
 
 #include "translator/class/class_parser.h"
 
+#include "translator/class/class_body.h"
 #include "translator/class/class_emission.h"
 #include "translator/class/class_head.h"
 #include "translator/class/mixin_list.h"
 #include "translator/emit/emit.h"
 #include "translator/emit/records.h"
+#include "translator/interface/interface_def.h"
 #include "translator/model/model.h"
+#include "translator/reader/qrex_parser.h"
+#include "translator/reader/qualifiers.h"
 
 namespace qrex {
 
@@ -281,18 +285,6 @@ void ClassStatement::Parse() {
 void ParseClass(QrexParser& parser, ClassKind kind, ClassDef* enclosing) {
   NestingGuard guard(parser);
   ClassStatement(parser, kind, enclosing).Parse();
-}
-
-void WriteForwardDeclaration(TextWriter& out, const ClassDef& def) {
-  out << def.TemplatePrefix() << def.StructWord() << def.name << ";\n";
-}
-
-void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def) {
-  if (!def.m_reflected) return;
-  if (def.IsMixin() || def.IsTemplate()) return WriteGetTypeOps(out, def);
-  for (std::string_view text : {"vesk::ReflectedClass const& _GetReflected(", "vesk::TypeOps const& _GetTypeOps("}) {
-    out << ExportPrefix(def) << text << def.GetTemplateClassName() << " const*);\n";
-  }
 }
 
 }  // namespace qrex

@@ -2,11 +2,12 @@
 
 #include <algorithm>
 
+#include "translator/class/class_body.h"
 #include "translator/class/class_emission.h"
-#include "translator/class/class_parser.h"
 #include "translator/emit/emit.h"
 #include "translator/interface/interface_def.h"
 #include "translator/model/model.h"
+#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
 
@@ -179,7 +180,7 @@ void ParseAdtBody(QrexParser& parser, ClassDef& adt) {
 
 void ParseImplementing(QrexParser& parser, ClassDef& def) {
   std::vector<const InterfaceDef*> implemented;
-  if (parser.WarningOn(1014)) implemented = def.AllInterfaces();
+  if (parser.WarningOn(1014)) implemented = AllInterfaces(def);
   parser.Advance();
   for (;; parser.Advance()) {
     const NameSpaceElement* owner = nullptr;

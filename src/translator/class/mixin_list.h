@@ -4,9 +4,10 @@
 #include <string>
 
 #include "translator/declared/class_def.h"
-#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
+
+class QrexParser;
 
 void ParseMixinList(QrexParser& parser, ClassDef& def, std::string& baseText);  // on `[`; stands behind `]` afterwards
 void ParseAdtBody(QrexParser& parser, ClassDef& adt);                           // on `{`; leaves it on the matching `}`

@@ -3,7 +3,6 @@
 #include <algorithm>
 
 #include "translator/emit/byte_code.h"
-#include "translator/interface/interface_def.h"
 #include "translator/symbols/scanned_file.h"
 
 namespace qrex {
@@ -16,7 +15,7 @@ constexpr TraitsKind kTraitsKinds[] = {TraitsKind::Struct, TraitsKind::Class, Tr
 }  // namespace
 
 ClassDef::ClassDef(ScannedFile& owner, const char* position, ClassKind kind)
-    : NameSpaceElement(owner, position, Category::Class), kind(kind) {
+    : RecordedElement(owner, position, Category::Class), kind(kind) {
   traitsKind = kTraitsKinds[static_cast<size_t>(kind)];
 }
 
@@ -157,15 +156,6 @@ std::string ClassDef::ModelStructName() const { return IsPureModel() && !m_isAno
 std::string ClassDef::QualifiedModelStructName() const {
   const std::string& qualified = GetQualifiedName();
   return qualified.substr(0, qualified.size() - name.size()) + ModelStructName();
-}
-
-std::vector<const InterfaceDef*> ClassDef::AllInterfaces() const {
-  std::vector<const InterfaceDef*> all;
-  for (const InterfaceDef* interface : m_interfaces) {
-    for (const InterfaceDef::FlatBase& flat : interface->FlattenedBases()) all.push_back(flat.base);
-    all.push_back(interface);
-  }
-  return all;
 }
 
 }  // namespace qrex

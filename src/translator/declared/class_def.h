@@ -7,7 +7,10 @@
 #include <string_view>
 #include <vector>
 
+#include "translator/declared/qualifiers.h"
+#include "translator/emit/records.h"
 #include "translator/symbols/name_space.h"
+#include "translator/symbols/type_predicates.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -16,20 +19,6 @@ class InterfaceDef;
 
 enum class ClassKind { Struct, Class, Adt, Mixin, Model };
 std::string_view KeywordOf(ClassKind kind);
-
-enum class TriState : uint8_t { Unset, Off, On };  // `-word` is off, `word` is on
-inline bool OnOr(TriState state, bool otherwise) {
-  return state == TriState::Unset ? otherwise : state == TriState::On;
-}
-
-enum class FieldKind { Plain, Indep, Dep };
-
-struct ClassField {
-  std::string name;
-  TypeCode type;
-  FieldKind kind = FieldKind::Plain;
-  bool reflected = false;
-};
 
 struct ModelField {
   std::string m_name;
@@ -41,13 +30,7 @@ struct ModelField {
   bool IsDropped() const { return m_rsnDropped >= 0; }
 };
 
-// The words of a class's << >> list that are kept as they are said.
-struct ClassQualifiers {
-  TriState abstract{}, dc{}, copy{}, compare{}, print{}, ser{}, os{}, ar{}, extern_{}, passbyvalue{}, returnbyvalue{},
-      multiline{}, traits{}, genop{}, rod{};
-};
-
-class ClassDef : public NameSpaceElement, public TypeBehaviour {
+class ClassDef : public RecordedElement, public TypeBehaviour {
  public:
   ClassDef(ScannedFile& owner, const char* position, ClassKind kind);
 
@@ -101,9 +84,6 @@ class ClassDef : public NameSpaceElement, public TypeBehaviour {
   bool WriteInsertionExtractionInTermsOfSerialise() const;
   std::string ModelStructName() const;           // N for a named $model, else N_model
   std::string QualifiedModelStructName() const;  // with the enclosing name spaces
-
-  // The interfaces of `isa` with their flattened bases ahead of each, as QueryInterface walks them.
-  std::vector<const InterfaceDef*> AllInterfaces() const;
 
   ClassKind kind;
   bool m_isAnonymous = false;  // a model without a name of its own

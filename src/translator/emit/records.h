@@ -1,5 +1,4 @@
-// What all reflection records share: where their text goes, how it is wrapped, and how registration functions of things
-// end in one function per project.
+// What all reflection records share: where their text goes and how it is wrapped.
 #pragma once
 
 #include <string>
@@ -8,13 +7,17 @@
 #include "translator/emit/byte_code.h"
 #include "translator/emit/emit.h"
 #include "translator/symbols/name_space.h"
-#include "translator/symbols/scanned_file.h"
 
 namespace qrex {
 
-class QrexParser;
+// Base of all kinds but name spaces: the common shape of a tail's entry.
+class RecordedElement : public NameSpaceElement {
+ public:
+  using NameSpaceElement::NameSpaceElement;
+  void WriteReflection(TextWriter& out, RegistrationLists& lists) override;  // comment, name spaces, record, function
+};
 
-// --- Pieces of NameSpaceElement::WriteReflection, for kinds that vary the common shape.
+// --- Pieces of RecordedElement::WriteReflection, for kinds that vary the common shape.
 void WriteReflectionHead(TextWriter& out, const NameSpaceElement& element);  // "\n//### ..." and the target declaration
 void WriteRegistration(TextWriter& out, const NameSpaceElement& element, RegistrationLists& lists);  // if m_registered
 
@@ -27,14 +30,5 @@ void WriteSignatureRows(TextWriter& out, const NameSpaceElement& element, const 
 
 // --- At the place of a declaration: closes the open name spaces, writes the TypeTraits block, reopens them.
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element);
-
-// --- $type
-void ParseType(QrexParser& parser);
-
-// --- Tails
-// Writes the tails of the imports that this .cpp must register and its own, and stores the lists in the registries.
-void WriteReflectionTails(ScannedFile& file, TextWriter& out);
-// Register_Project_P or Unregister_Project_P.
-void WriteProjectRegistration(const ScannedFile& mainFile, const DeclarationRegistry& registry, TextWriter& out);
 
 }  // namespace qrex

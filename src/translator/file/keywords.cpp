@@ -1,14 +1,15 @@
 #include "translator/file/keywords.h"
 
+#include "translator/class/class_body.h"
 #include "translator/class/class_members.h"
 #include "translator/class/class_parser.h"
 #include "translator/class/mixin_list.h"
-#include "translator/emit/records.h"
-#include "translator/interface/interface_def.h"
-#include "translator/kinds/enum_def.h"
-#include "translator/kinds/functor_def.h"
-#include "translator/kinds/global_defs.h"
-#include "translator/kinds/variant_def.h"
+#include "translator/interface/interface_parser.h"
+#include "translator/kinds/enum_parser.h"
+#include "translator/kinds/functor_parser.h"
+#include "translator/kinds/global_parsers.h"
+#include "translator/kinds/type_registration.h"
+#include "translator/kinds/variant_parser.h"
 #include "translator/model/model.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -79,7 +80,9 @@ constexpr ClassKeyword kClassKeywords[] = {
 
 }  // namespace
 
-std::span<const Keyword> FileLevelKeywords() { return kKeywords; }
-std::span<const ClassKeyword> ClassLevelKeywords() { return kClassKeywords; }
+const KeywordTables& AllKeywords() {
+  static constexpr KeywordTables kTables{kKeywords, kClassKeywords};
+  return kTables;
+}
 
 }  // namespace qrex

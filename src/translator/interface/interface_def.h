@@ -5,9 +5,7 @@
 #include <string_view>
 #include <vector>
 
-#include "translator/declared/class_def.h"
-#include "translator/reader/qrex_parser.h"
-#include "translator/symbols/name_space.h"
+#include "translator/emit/records.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -17,9 +15,9 @@ struct AttributeDef {
   TypeCode type;
 };
 
-class InterfaceDef : public NameSpaceElement {
+class InterfaceDef : public RecordedElement {
  public:
-  InterfaceDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Interface) {
+  InterfaceDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Interface) {
     traitsKind = TraitsKind::Interface;
   }
 
@@ -52,7 +50,5 @@ class InterfaceDef : public NameSpaceElement {
   size_t m_numDeclaredMethods = 0;
   std::vector<AttributeDef> m_attributes;
 };
-
-void ParseInterface(QrexParser& parser, ClassDef* enclosing);  // `enclosing`: null at file level
 
 }  // namespace qrex

@@ -5,14 +5,14 @@
 #include <string>
 #include <vector>
 
-#include "translator/declared/class_def.h"
-#include "translator/reader/qrex_parser.h"
+#include "translator/declared/qualifiers.h"
+#include "translator/emit/records.h"
 
 namespace qrex {
 
-class EnumDef : public NameSpaceElement {
+class EnumDef : public RecordedElement {
  public:
-  EnumDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Enum) {
+  EnumDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Enum) {
     traitsKind = TraitsKind::Enum;
   }
   std::string_view GetKeyword() const override { return "enum"; }
@@ -31,7 +31,5 @@ class EnumDef : public NameSpaceElement {
   std::vector<int64_t> m_values;  // empty, or one per label
   std::vector<bool> m_enabled;    // one per label
 };
-
-void ParseEnum(QrexParser& parser, ClassDef* enclosing);
 
 }  // namespace qrex

@@ -1,15 +1,14 @@
-// $functor: a callable value of an object pointer and a stub function; $makefunctor and $makeconstfunctor turn a block
-// of code into one.
+// $functor: a callable value of an object pointer and a stub function.
 #pragma once
 
-#include "translator/reader/qrex_parser.h"
+#include "translator/emit/records.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
 
-class FunctorDef : public NameSpaceElement {
+class FunctorDef : public RecordedElement {
  public:
-  FunctorDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Functor) {
+  FunctorDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Functor) {
     traitsKind = TraitsKind::Functor;
     status = DeclStatus::Defined;
   }
@@ -23,8 +22,5 @@ class FunctorDef : public NameSpaceElement {
 
   FunctionSignature signature;
 };
-
-void ParseFunctor(QrexParser& parser, bool nested);
-void ParseMakeFunctor(QrexParser& parser);  // the keyword tells the const form
 
 }  // namespace qrex

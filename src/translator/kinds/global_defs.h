@@ -2,7 +2,8 @@
 // typedef).
 #pragma once
 
-#include "translator/reader/qrex_parser.h"
+#include "translator/symbols/name_space.h"
+#include "translator/symbols/type_predicates.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -56,9 +57,5 @@ class TypedefDef : public GlobalDef, public TypedefTarget {
 
   TypeCode type;
 };
-
-void ParseGlobalFunction(QrexParser& parser, bool polymorphic);
-void ParseGlobalVar(QrexParser& parser);
-void ParseTypedef(QrexParser& parser);
 
 }  // namespace qrex

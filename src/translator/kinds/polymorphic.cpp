@@ -1,7 +1,9 @@
 #include "translator/kinds/polymorphic.h"
 
 #include "translator/emit/emit.h"
+#include "translator/kinds/global_defs.h"
 #include "translator/kinds/variant_def.h"
+#include "translator/reader/qrex_parser.h"
 #include "translator/symbols/scanned_file.h"
 
 namespace qrex {

@@ -5,8 +5,9 @@
 #include <string>
 #include <vector>
 
-#include "translator/declared/class_def.h"
-#include "translator/reader/qrex_parser.h"
+#include "translator/declared/qualifiers.h"
+#include "translator/emit/records.h"
+#include "translator/symbols/type_predicates.h"
 
 namespace qrex {
 
@@ -25,9 +26,9 @@ struct VariantItem {
   std::string MangledTagName() const;
 };
 
-class VariantDef : public NameSpaceElement, public TypeBehaviour {
+class VariantDef : public RecordedElement, public TypeBehaviour {
  public:
-  VariantDef(ScannedFile& owner, const char* position) : NameSpaceElement(owner, position, Category::Variant) {
+  VariantDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Variant) {
     traitsKind = TraitsKind::Variant;
   }
   std::string_view GetKeyword() const override { return "variant"; }
@@ -57,9 +58,5 @@ class VariantDef : public NameSpaceElement, public TypeBehaviour {
   mutable Memo m_visitsObjects = Memo::NotComputed, m_visitsPrefs = Memo::NotComputed;
   bool AnyItemVisits(Memo& memo, bool (*test)(std::string_view, NameSpace&)) const;
 };
-
-void ParseVariant(QrexParser& parser, ClassDef* enclosing);
-void WriteVariantBody(TextWriter& out, const VariantDef& def);  // of the class
-void WriteVariantTail(TextWriter& out, const VariantDef& def);  // behind it
 
 }  // namespace qrex

@@ -359,4 +359,45 @@ class VariantTail {
 
 void WriteVariantTail(TextWriter& out, const VariantDef& def) { VariantTail(out, def).Write(); }
 
+// --- Record
+
+void VariantDef::WriteReflectedDefinition(TextWriter& out) {
+  out << ExportPrefix(*this) << "vesk::ReflectedVariant const& _GetReflected(" << name << " const*)\n";
+  {
+    Block body(out);
+    StringTable strings;
+    if (!metadata.empty()) WriteMetadataByteCode(out, name + "_metadata", strings, metadata);
+    for (const auto& item : m_items) {
+      if (item->isStruct) {
+        out << "// todo : byte code for anonymous struct\n";
+      } else {
+        WriteTypeByteCode(out, name + "_" + item->MangledTagName(), strings, item->type);
+      }
+    }
+    out << "static const vesk::ReflectedField " << name << "_fields[] =\n";
+    {
+      Block rows(out, ";");
+      for (const auto& item : m_items) {
+        out << "{ \"" << item->EffectiveName() << "\", 4, "
+            << (item->isStruct ? "NULL" : name + "_" + item->MangledTagName()) << " },\n";
+      }
+    }
+    WriteStringTable(out, strings, name);
+    out << "static const vesk::ReflectedVariant " << name << "_variant =\n";
+    {
+      Block record(out, ";");
+      out << "\"" << GetQualifiedName() << "\",\nsizeof(" << name << "),\n";
+      out << NameOrZero(!metadata.empty(), name + "_metadata") << ",\n";
+      out << CountedName(m_items.size(), name + "_fields") << ",\n";
+      out << NameOrZero(!strings.Empty(), name + "_stringTable") << ",\n";
+      Block ops(out);
+      WriteTypeOps(out, name, TypeOpsBits());
+    }
+    out << "return " << name << "_variant;\n";
+  }
+  out << ExportPrefix(*this) << "vesk::TypeOps const& _GetTypeOps(" << name << " const*)\n";
+  Block body(out);
+  out << "return vesk::GetReflectedVariant<" << name << ">().m_ops;\n";
+}
+
 }  // namespace qrex

@@ -2,9 +2,9 @@
 
 #include <algorithm>
 
-#include "translator/class/class_emission.h"
 #include "translator/emit/emit.h"
 #include "translator/model/model_accessors.h"
+#include "translator/reader/qrex_parser.h"
 #include "translator/symbols/scanned_file.h"
 
 namespace qrex {

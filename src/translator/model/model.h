@@ -4,9 +4,10 @@
 #include "translator/declared/class_def.h"
 #include "translator/emit/byte_code.h"
 #include "translator/model/type_expansion.h"
-#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
+
+class QrexParser;
 
 // On the `{` or the `<<` of the block; leaves it on the closing `}`. Constructor text is written while it is read.
 // `expansion`: what will be generated of the fields.

@@ -4,9 +4,10 @@
 #include <algorithm>
 
 #include "lex/literals.h"
-#include "translator/class/class_parser.h"
 #include "translator/emit/emit.h"
 #include "translator/model/model.h"
+#include "translator/reader/qrex_parser.h"
+#include "translator/reader/qualifiers.h"
 
 namespace qrex {
 

@@ -2,7 +2,8 @@
 
 #include <algorithm>
 
-#include "translator/file/keywords.h"
+#include "translator/declared/class_def.h"
+#include "translator/reader/qrex_parser.h"
 
 namespace qrex {
 
@@ -17,7 +18,7 @@ bool ReplaceItem(QrexParser& parser, ClassDef& def) {
   if (std::find(std::begin(kWordsInCode), std::end(kWordsInCode), word.text.View()) == std::end(kWordsInCode)) {
     return false;
   }
-  for (const ClassKeyword& keyword : ClassLevelKeywords()) {
+  for (const ClassKeyword& keyword : parser.Keywords().classLevel) {
     if (!word.Is(keyword.word)) continue;
     parser.CopyToCurrent();
     parser.Advance();

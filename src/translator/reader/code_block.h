@@ -2,11 +2,12 @@
 #pragma once
 
 #include <string>
-
-#include "translator/declared/class_def.h"
-#include "translator/reader/qrex_parser.h"
+#include <string_view>
 
 namespace qrex {
+
+class ClassDef;
+class QrexParser;
 
 // On the `{`. Copies through the matching `}` and up to the next token, which is current afterwards, and ends the line.
 void CopyCodeBlock(QrexParser& parser, ClassDef& def);

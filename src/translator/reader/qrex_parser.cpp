@@ -6,9 +6,6 @@
 #include "lex/literals.h"
 #include "lex/sections.h"
 #include "text/paths.h"
-#include "translator/emit/records.h"
-#include "translator/file/keywords.h"
-#include "translator/file/predefined_variables.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -48,14 +45,15 @@ const char* QrexParserOutputStream::SourcePosition(const char* expanded) const {
   return MapOutputOffset(m_map, (expanded < last ? expanded : last) - m_expanded.begin);
 }
 
-QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded)
+QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded,
+                       const KeywordTables& keywords)
     : file(file),
       stream(stream),
       out(out),
       expanded(expanded),
+      m_keywords(keywords),
       m_copyPosition(expanded.begin),
       m_nameSpaces{file.rootNameSpace.get()} {
-  m_warnings.fill(true);
   SetInput(expanded);
 }
 
@@ -111,7 +109,7 @@ void QrexParser::Translate() {
     }
   }
   CopyTo(expanded.end);
-  if (!m_savedWarnings.empty()) ReportWarning(1015, "$warning(push) without matching pop");
+  if (warnings.HasSaved()) ReportWarning(1015, "$warning(push) without matching pop");
 }
 
 void QrexParser::CheckInclude() {
@@ -174,7 +172,7 @@ void QrexParser::CloseBrace() {
 }
 
 void QrexParser::Dispatch() {
-  for (const Keyword& keyword : FileLevelKeywords()) {
+  for (const Keyword& keyword : m_keywords.fileLevel) {
     if (!Is(keyword.word)) continue;
     keyword.parse(*this);
     if (!keyword.advancesItself) Advance();
@@ -277,63 +275,5 @@ void ParseInitBlock(QrexParser& parser, std::string_view keyword, std::vector<st
 
 void ParseInit(QrexParser& parser) { ParseInitBlock(parser, "Register", parser.file.registerNames); }
 void ParseUninit(QrexParser& parser) { ParseInitBlock(parser, "Unregister", parser.file.unregisterNames); }
-
-// --- One file
-
-namespace {
-
-std::string IncludeGuard(std::string_view path) {
-  std::string guard = "_";
-  for (char c : path) {
-    const bool isPlain = (c >= '0' && c <= '9') || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
-    guard += isPlain ? c : '_';
-  }
-  return guard;
-}
-
-void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded) {
-  const FileKind kind = file.file.kind;
-  constexpr size_t kUsualLine = 32;
-  file.lineTable.reserve(expanded.Size() / kUsualLine);
-  QrexParserOutputStream stream(target, file.lineTable, expanded, file.expansionMap);
-  TextWriter out(stream);
-  if (kind == FileKind::H) {
-    const std::string guard = IncludeGuard(file.file.path);
-    TextWriter head(target);  // not counted in the line table, which begins with the text proper
-    head << "#pragma once\n#ifndef " << guard << "\n#define " << guard << "\n\n";
-    head.Flush();
-  }
-  QrexParser(file, stream, out, expanded).Translate();
-  out.Flush();
-  if (const char* last = stream.SourcePosition()) file.lineTable.push_back(last);
-
-  file.hasDeclarations = file.rootNameSpace->HaveSomethingToRegister();
-  if (kind == FileKind::Cpp) WriteReflectionTails(file, out);
-  if (file.file.isMainSource) {
-    WriteProjectRegistration(file, file.host.RegisterMap(), out);
-    WriteProjectRegistration(file, file.host.UnregisterMap(), out);
-  }
-  if (kind == FileKind::H) out << "\n#endif // include guard\n";
-  out.Flush();
-}
-
-}  // namespace
-
-void TranslateFile(ScannedFile& file, IOutputStream& target) {
-  DefinePredefinedVariables(file);
-  file.lineTable.clear();
-  TextRange expanded;
-  try {
-    expanded = ExpandWithMap(&file, file.frame, TextRange(std::string_view(file.sourceText)), 0, 0, file.expandedText,
-                             file.expansionMap);
-    TranslateText(file, target, expanded);
-  } catch (LexScannerException& exception) {
-    MapErrorPosition(file.expansionMap, expanded, exception);
-    if (exception.file.empty() && exception.position) {
-      file.host.FindSourcePosition(exception.position, exception.file, exception.line);
-    }
-    throw;
-  }
-}
 
 }  // namespace qrex

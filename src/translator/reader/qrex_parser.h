@@ -1,13 +1,12 @@
 // The translator proper: scans the expanded text of one file, copies plain C++ through, and sends each `$` keyword to
-// its handler. Handlers are free functions `void ParseX(QrexParser&)`, one pair of files per declared kind, in the
-// table of qrex_parser.cpp; this class is what they share: tokens, copying, names, types, warnings.
+// its handler. Handlers are free functions `void ParseX(QrexParser&)`, in the tables of file/keywords.cpp, which the
+// parser is given; this class is what they share: tokens, copying, names, types, warnings.
 //
 // A handler is called with its keyword as the current token and leaves the current token on the last one of its
 // declaration (the main loop reads on from there). It drops source text by moving the copy position forward without
 // copying.
 #pragma once
 
-#include <array>
 #include <cstdint>
 #include <functional>
 #include <memory>
@@ -18,8 +17,11 @@
 #include "macro/expression_parser.h"
 #include "macro/source_map.h"
 #include "text/streams.h"
+#include "translator/reader/keywords.h"
+#include "translator/reader/warnings.h"
 #include "translator/symbols/name_space.h"
 #include "translator/symbols/scanned_file.h"
+#include "translator/symbols/type_predicates.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -49,7 +51,8 @@ class QrexParserOutputStream : public IOutputStream {
 
 class QrexParser : public ExpressionParser {
  public:
-  QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded);
+  QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded,
+             const KeywordTables& keywords);
 
   void Translate();  // the main loop over the whole text
 
@@ -109,8 +112,8 @@ class QrexParser : public ExpressionParser {
   void ParseMetadataValue(std::string& out);
   void ParseOptionalMetadata(std::string& out);  // tests for `[`
 
-  // --- Warnings: 18 codes, 1000 + index, that $warning switches on and off.
-  bool WarningOn(int code) const { return m_warnings[static_cast<size_t>(code - 1000)]; }
+  // --- Warnings
+  bool WarningOn(int code) const { return warnings.On(code); }
   // Position: `address` in the expanded text, else the element's, else where the scanner reads.
   void ReportWarning(int code, std::string_view text, const NameSpaceElement* element = nullptr,
                      const char* address = nullptr);
@@ -129,19 +132,18 @@ class QrexParser : public ExpressionParser {
   NameSpace& Root() { return *m_nameSpaces.front(); }
   bool AtFileScope() const { return m_nameSpaces.size() == 1; }
   const Project& GetProject() const { return *file.file.project; }
+  const KeywordTables& Keywords() const { return m_keywords; }
 
   const char* lastNameEnd = nullptr;  // behind the name that ParseTypeWithName read last
   size_t lastSuffixSize = 0;          // of the part of its code that stands for the arrays behind the name
-  int nesting = 0;                    // of declarations inside declarations, see NestingGuard
+  Warnings warnings;
+  int nesting = 0;  // of declarations inside declarations, see NestingGuard
   ScannedFile& file;
   QrexParserOutputStream& stream;
   TextWriter& out;
   const TextRange expanded;
 
  private:
-  friend void ParseWarning(QrexParser& parser);
-  using WarningFlags = std::array<bool, 18>;
-
   void CheckInclude();
   bool TranslateAt();
   void OpenNameSpace();
@@ -156,12 +158,11 @@ class QrexParser : public ExpressionParser {
   void ParseSignatureEnd(FunctionSignature& signature, bool constAllowed);
   size_t ParseMetadataValues(std::string& out, int32_t close, std::string_view expected, std::string_view exceeded);
 
+  const KeywordTables& m_keywords;
   const char* m_copyPosition;
   std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
   std::vector<int64_t> m_savedDepths;
   int64_t m_braceDepth = 0;
-  WarningFlags m_warnings;
-  std::vector<WarningFlags> m_savedWarnings;
 };
 
 // Bounds the recursion of handlers that call each other for nested declarations, types or lists.
@@ -178,9 +179,6 @@ class NestingGuard {
  private:
   QrexParser& m_parser;
 };
-
-// Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`.
-void TranslateFile(ScannedFile& file, IOutputStream& target);
 
 // Handlers that other kinds call inside their bodies.
 void ParseNew(QrexParser& parser);

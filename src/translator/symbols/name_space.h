@@ -46,8 +46,8 @@ class NameSpaceElement {
   virtual bool HaveSomethingToRegister() const = 0;
   virtual bool HasRecord() const { return m_reflected; }
   virtual void WriteReflectedDefinition(TextWriter& out) = 0;  // the record
-  // The element's text in the reflection tail: comment, name spaces, record, registration function (records.h).
-  virtual void WriteReflection(TextWriter& out, RegistrationLists& lists);
+  // The element's text in the reflection tail (emit/records.h).
+  virtual void WriteReflection(TextWriter& out, RegistrationLists& lists) = 0;
   virtual DeclStatus GetDeclStatus() const = 0;
   virtual bool EffectivelyRegistered() const { return m_registered; }
   virtual void CollectReferences(std::vector<const NameSpaceElement*>& out) const = 0;  // appends

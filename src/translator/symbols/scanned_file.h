@@ -1,4 +1,5 @@
-// One file under translation, and what the translator asks of the build that owns it.
+// One file under translation, as data, and what the translator asks of the build that owns it. Translating is done by
+// file/translate_file.h.
 #pragma once
 
 #include <cstdint>
@@ -6,8 +7,8 @@
 #include <string>
 #include <vector>
 
-#include "macro/expand.h"
 #include "macro/frame.h"
+#include "macro/source_map.h"
 #include "text/index_set.h"
 #include "translator/symbols/name_space.h"
 #include "workspace/project_model.h"
@@ -55,17 +56,14 @@ struct TypeRegistration {
 // has its stem.
 bool MayHoldTail(const ProjectFile& source, const ProjectFile& imported);
 
-class ScannedFile : public ImportHandler {
+class ScannedFile {
  public:
   ScannedFile(TranslationHost& host, ProjectFile& file);
-  ~ScannedFile() override;
 
-  // Translates this file, once per run, and writes the output when `needsWriting` is set (and clears it).
-  void WriteGeneratedFile();
-  bool Import(LSFrame& frame, const std::string& path, const char* position) override;
   ProjectFile* ResolveImport(const std::string& path) const;  // or null
-  std::string ImportHint(const std::string& path) const override;
+  std::string ImportHint(const std::string& path) const;      // where it was looked for, see Hint
   std::string SourcePath() const;
+  void ForgetTranslation();  // what the one before has found, ahead of the next
   // The source position of a 1-based line of the generated text; false (with a message to `trace`) when there is none.
   bool MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const;
 
@@ -99,11 +97,6 @@ class ScannedFile : public ImportHandler {
   bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
   LSFileFrame frame;
   std::unique_ptr<NameSpace> rootNameSpace;
-
- private:
-  void WriteTranslation(const std::string& target);
-  void HoldTails(const std::vector<ScannedFile*>& oldImports);
-  bool CopySource(const std::string& target) const;  // false, with a message, when it failed
 };
 
 }  // namespace qrex

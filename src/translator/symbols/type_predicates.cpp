@@ -1,8 +1,4 @@
-// What types are and can do, with typedefs resolved.
-
-#include <algorithm>
-
-#include "translator/types/type_code.h"
+#include "translator/symbols/type_predicates.h"
 
 namespace qrex {
 
@@ -41,23 +37,6 @@ std::string_view SkipDecorators(std::string_view code, NameSpace& root, uint32_t
     code.remove_prefix(1);
   }
 }
-
-bool HasMetadata(std::string_view code) {
-  for (;;) {
-    const uint8_t op = Op(code);
-    if (op >= 160) return true;
-    if (op < 40) return false;
-    if (op == kOpMap) {
-      if (HasMetadata(MapKey(code))) return true;
-      code = MapValue(code);
-    } else {
-      code.remove_prefix(op == kOpArray ? 5 : 1);
-    }
-  }
-}
-
-bool IsVoid(std::string_view code) { return Op(SkipMetadata(code)) == kOpVoid; }
-bool IsInt32(std::string_view code) { return Op(SkipMetadata(code)) == kOpInt32; }
 
 bool IsSerialisable(std::string_view code, NameSpace& root) {
   for (;;) {
@@ -156,12 +135,6 @@ void CollectNamedTypes(std::string_view code, NameSpace& root, std::vector<const
 void CollectNamedTypes(const FunctionSignature& signature, NameSpace& root, std::vector<const NameSpaceElement*>& out) {
   CollectNamedTypes(signature.returnType, root, out);
   for (const FunctionArg& argument : signature.arguments) CollectNamedTypes(argument.type, root, out);
-}
-
-bool SignatureHasMetadata(const FunctionSignature& signature) {
-  return !signature.metadata.empty() || HasMetadata(signature.returnType) ||
-         std::any_of(signature.arguments.begin(), signature.arguments.end(),
-                     [](const FunctionArg& argument) { return HasMetadata(argument.type); });
 }
 
 int64_t SizeInBytes(std::string_view code, NameSpace& root) {

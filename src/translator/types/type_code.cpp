@@ -1,5 +1,7 @@
 #include "translator/types/type_code.h"
 
+#include <algorithm>
+
 #include "text/numbers.h"
 
 namespace qrex {
@@ -99,6 +101,30 @@ std::string_view MapKey(std::string_view code) {
   return code.substr(1, SkipWholeType(code.substr(1)).data() - code.data() - 1);
 }
 std::string_view MapValue(std::string_view code) { return SkipWholeType(code.substr(1)); }
+
+// --- Metadata and void
+
+bool HasMetadata(std::string_view code) {
+  for (;;) {
+    const uint8_t op = Op(code);
+    if (op >= 160) return true;
+    if (op < 40) return false;
+    if (op == kOpMap) {
+      if (HasMetadata(MapKey(code))) return true;
+      code = MapValue(code);
+    } else {
+      code.remove_prefix(op == kOpArray ? 5 : 1);
+    }
+  }
+}
+
+bool IsVoid(std::string_view code) { return Op(SkipMetadata(code)) == kOpVoid; }
+
+bool SignatureHasMetadata(const FunctionSignature& signature) {
+  return !signature.metadata.empty() || HasMetadata(signature.returnType) ||
+         std::any_of(signature.arguments.begin(), signature.arguments.end(),
+                     [](const FunctionArg& argument) { return HasMetadata(argument.type); });
+}
 
 // --- Printing
 

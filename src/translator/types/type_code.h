@@ -9,7 +9,6 @@
 #include <vector>
 
 #include "text/text_writer.h"
-#include "translator/symbols/name_space.h"
 
 namespace qrex {
 
@@ -101,6 +100,11 @@ std::string_view ArrayElement(std::string_view code);
 std::string_view MapKey(std::string_view code);  // of an opcode 81 at the head; the value stands behind it
 std::string_view MapValue(std::string_view code);
 
+// --- Metadata and void
+bool HasMetadata(std::string_view code);
+bool IsVoid(std::string_view code);
+bool SignatureHasMetadata(const FunctionSignature& signature);  // its own, or in its return or an argument type
+
 // --- Printing
 enum class DeclarationMode { Plain, Reference, ConstReference };
 void PrintType(TextWriter& out, std::string_view code);
@@ -109,54 +113,5 @@ void PrintDeclaration(TextWriter& out, std::string_view code, std::string_view n
 std::string ConstReferenceText(std::string_view code, std::string_view name);  // "T const& name"
 std::string MangledType(std::string_view code);
 std::string QualifiedDestructorText(std::string_view code);  // "vesk::xset<T>::~xset"; empty for a type without one
-
-// --- Predicates. `root` is the root name space of the file of the element that holds the type.
-enum DecoratorBits : uint32_t {
-  kHasVolatile = 1,
-  kHasConst = 2,
-  kHasAssignable = 4,
-  kHasMovable = 8,
-  kHasOffsettable = 16
-};
-// Skips metadata and replaces typedefs by their target at the head; the result may refer to the typedef's own code.
-std::string_view SkipToType(std::string_view code, NameSpace& root);
-std::string_view SkipDecorators(std::string_view code, NameSpace& root, uint32_t& decorators);
-NameSpaceElement* NamedElement(std::string_view code, NameSpace& root);  // of an opcode 32..38 at the head; or null
-bool HasMetadata(std::string_view code);
-bool IsVoid(std::string_view code);
-bool IsInt32(std::string_view code);
-bool IsSerialisable(std::string_view code, NameSpace& root);
-bool NeedsVisitObjects(std::string_view code, NameSpace& root);
-bool NeedsVisitPrefs(std::string_view code, NameSpace& root);
-void CollectNamedTypes(std::string_view code, NameSpace& root, std::vector<const NameSpaceElement*>& out);
-void CollectNamedTypes(const FunctionSignature& signature, NameSpace& root, std::vector<const NameSpaceElement*>& out);
-bool SignatureHasMetadata(const FunctionSignature& signature);  // its own, or in its return or an argument type
-int64_t SizeInBytes(std::string_view code, NameSpace& root);    // -1 unknown
-bool SameType(std::string_view a, NameSpace& rootA, std::string_view b, NameSpace& rootB);
-
-struct TypeContext {
-  uint8_t enclosing = 0;
-  bool isMutable = false;
-  bool inModel = false;
-  bool serialisable = false;
-  bool allowVoid = false;
-};
-bool CheckType(std::string_view code, NameSpace& root, TypeContext context, std::string& message);
-
-// What stands behind a typedef: TypedefDef derives from this as well.
-class TypedefTarget {
- public:
-  virtual ~TypedefTarget() = default;
-  virtual const TypeCode& TargetType() const = 0;
-};
-
-// What IsSerialisable and the visit predicates ask of a class or variant: both derive from this as well.
-class TypeBehaviour {
- public:
-  virtual ~TypeBehaviour() = default;
-  virtual bool CanSerialise() const = 0;
-  virtual bool IsIObjectVisitable() const = 0;
-  virtual bool IsPrefVisitable() const = 0;
-};
 
 }  // namespace qrex

@@ -1,0 +1,252 @@
+#include "translator/file/translate_file.h"
+
+#include <unordered_set>
+
+#include "lex/scanner.h"
+#include "macro/expand.h"
+#include "text/files.h"
+#include "text/output_policy.h"
+#include "text/scope_timer.h"
+#include "text/trace.h"
+#include "translator/file/keywords.h"
+#include "translator/file/predefined_variables.h"
+#include "translator/file/tails.h"
+#include "translator/reader/qrex_parser.h"
+#include "workspace/project_model.h"
+
+namespace qrex {
+
+namespace {
+
+// The chain of imports that leads from `from` to `to`, both included.
+std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const ScannedFile& to) {
+  std::unordered_set<const ScannedFile*> seen{&from};
+  struct Level {
+    const ScannedFile* file;
+    size_t next = 0;
+  };
+  std::vector<Level> path{{&from}};
+  while (!path.empty()) {
+    Level& level = path.back();
+    if (level.file == &to) {
+      std::vector<const ScannedFile*> chain;
+      for (const Level& step : path) chain.push_back(step.file);
+      return chain;
+    }
+    if (level.next == level.file->imports.size()) {
+      path.pop_back();
+    } else {
+      const ScannedFile* import = level.file->imports[level.next++];
+      if (seen.insert(import).second) path.push_back({import});
+    }
+  }
+  return {};
+}
+
+// Brings what the file under expansion imports up to date, and makes it visible.
+class Importer : public ImportHandler {
+ public:
+  explicit Importer(ScannedFile& file) : m_file(file) {}
+
+  bool Import(LSFrame&, const std::string& path, const char*) override {
+    ProjectFile* target = m_file.ResolveImport(path);
+    if (!target) return false;
+    ScannedFile& imported = m_file.host.GetScannedFile(*target);
+    BringUpToDate(imported);
+
+    // A file in progress is not translated again, so a cycle shows as a chain from the import back to this file.
+    if (&imported == &m_file || imported.importClosure.Has(m_file.index)) {
+      ReportCycle(imported);
+      return false;
+    }
+    m_file.frame.AddOrderedImport(imported.frame);
+    m_file.imports.push_back(&imported);
+    m_file.importClosure.Add(imported.index);
+    m_file.importClosure.Add(imported.importClosure);
+    m_file.importsIObject = m_file.importsIObject || imported.importsIObject;
+    return true;
+  }
+
+  std::string ImportHint(const std::string& path) const override { return m_file.ImportHint(path); }
+
+ private:
+  void ReportCycle(const ScannedFile& imported) const {
+    const std::vector<const ScannedFile*> chain = ImportChain(imported, m_file);
+    TraceWriter trace;
+    trace << "\nERROR: Cycle detected in import directives.  Files in cycle are...\n";
+    trace << "    " << m_file.file.path << "\n";
+    for (size_t i = 0; i + 1 < chain.size(); ++i) trace << "    " << chain[i]->file.path << "\n";
+  }
+
+  ScannedFile& m_file;
+};
+
+std::string IncludeGuard(std::string_view path) {
+  std::string guard = "_";
+  for (char c : path) {
+    const bool isPlain = (c >= '0' && c <= '9') || (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z');
+    guard += isPlain ? c : '_';
+  }
+  return guard;
+}
+
+void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded) {
+  const FileKind kind = file.file.kind;
+  constexpr size_t kUsualLine = 32;
+  file.lineTable.reserve(expanded.Size() / kUsualLine);
+  QrexParserOutputStream stream(target, file.lineTable, expanded, file.expansionMap);
+  TextWriter out(stream);
+  if (kind == FileKind::H) {
+    const std::string guard = IncludeGuard(file.file.path);
+    TextWriter head(target);  // not counted in the line table, which begins with the text proper
+    head << "#pragma once\n#ifndef " << guard << "\n#define " << guard << "\n\n";
+    head.Flush();
+  }
+  QrexParser(file, stream, out, expanded, AllKeywords()).Translate();
+  out.Flush();
+  if (const char* last = stream.SourcePosition()) file.lineTable.push_back(last);
+
+  file.hasDeclarations = file.rootNameSpace->HaveSomethingToRegister();
+  if (kind == FileKind::Cpp) WriteReflectionTails(file, out);
+  if (file.file.isMainSource) {
+    WriteProjectRegistration(file, file.host.RegisterMap(), out);
+    WriteProjectRegistration(file, file.host.UnregisterMap(), out);
+  }
+  if (kind == FileKind::H) out << "\n#endif // include guard\n";
+  out.Flush();
+}
+
+}  // namespace
+
+void TranslateFile(ScannedFile& file, IOutputStream& target) {
+  DefinePredefinedVariables(file);
+  file.lineTable.clear();
+  TextRange expanded;
+  try {
+    Importer importer(file);
+    expanded = ExpandWithMap(&importer, file.frame, TextRange(std::string_view(file.sourceText)), 0, 0,
+                             file.expandedText, file.expansionMap);
+    TranslateText(file, target, expanded);
+  } catch (LexScannerException& exception) {
+    MapErrorPosition(file.expansionMap, expanded, exception);
+    if (exception.file.empty() && exception.position) {
+      file.host.FindSourcePosition(exception.position, exception.file, exception.line);
+    }
+    throw;
+  }
+}
+
+// --- Output
+
+namespace {
+
+class DiscardStream : public IOutputStream {
+ public:
+  void Write(const void*, size_t) override {}
+  void Flush() override {}
+};
+
+bool IsTranslatedKind(FileKind kind) {
+  return kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H || kind == FileKind::Asm ||
+         kind == FileKind::Py;
+}
+
+void PrepareTarget(const std::string& path) {
+  CreateDirectories(path, false);
+  ChangeReadOnly(path, false);
+}
+
+bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated) {
+  std::string old;
+  if (!ReadWholeFile(old, path)) return false;
+  const std::string text = generated.Text();
+  try {
+    return SameTokens(LexScanner(std::string_view(old)), LexScanner(std::string_view(text)));
+  } catch (const LexScannerException&) {
+    return false;  // what stood there is no text of ours
+  }
+}
+
+// The output holds the tails of this translation, and no longer those of the one before.
+void HoldTails(ScannedFile& file, const std::vector<ScannedFile*>& oldImports) {
+  for (ScannedFile* import : oldImports) {
+    if (import->tailHolder == &file) import->tailHolder = nullptr;
+  }
+  file.lostTail = false;
+  for (ScannedFile* import : file.newTails) {
+    if (import->tailHolder && import->HasTail()) import->tailHolder->lostTail = true;
+    import->tailHolder = &file;
+  }
+}
+
+// The time of the translation is that of the reading: what is edited while it runs is stale in the next run.
+void WriteTranslation(ScannedFile& file, const std::string& target) {
+  const int64_t readTime = CurrentFileTime();
+  if (!LoadText(file.sourceText, file.SourcePath(), true)) {
+    throw LexScannerException("Couldn't open file " + file.SourcePath(), nullptr)
+        .WithHint(file.file.project->ListingHint(file.file));
+  }
+  const std::vector<ScannedFile*> knownImports = std::move(file.imports);
+  file.ForgetTranslation();
+  GeneratedFile generated(target);
+  DiscardStream discarded;
+  IOutputStream& out = file.needsWriting ? static_cast<IOutputStream&>(generated) : discarded;
+  try {
+    TranslateFile(file, out);
+  } catch (...) {
+    file.imports = knownImports;  // a part of them would hide from the next run what makes this file stale
+    throw;
+  }
+  if (!file.needsWriting) return;
+
+  const ConfigSettings& settings = file.host.Settings();
+  if (!settings.writeTokenEquivalent && IsTokenEquivalent(target, generated)) {
+    if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
+  } else {
+    if (settings.diagnostics) TraceWriter() << "Writing: " << target << "\n";
+    PrepareTarget(target);
+    generated.Commit();
+    if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+  }
+  file.needsWriting = false;
+  file.latestTargetTime = file.targetTime = 0;
+  file.translationTime = readTime;
+  HoldTails(file, knownImports);
+}
+
+// False, with a message, when it failed.
+bool CopySource(const ScannedFile& file, const std::string& target) {
+  ChangeReadOnly(target, false);
+  CreateDirectories(target, false);
+  if (!CopyFile(file.SourcePath(), target, false)) {
+    const SystemException failure;
+    TraceWriter() << "ERROR: Copy file " << file.SourcePath() << " to " << target << " failed\n";
+    ReportSystemError(failure);
+    TraceWriter() << Hint(file.file.project->ListingHint(file.file));
+    return false;
+  }
+  TouchFile(target, false);
+  if (file.host.Settings().makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+  return true;
+}
+
+}  // namespace
+
+void BringUpToDate(ScannedFile& file) {
+  if (!file.file.project->usesQrex) {
+    throw LexScannerException("File " + file.SourcePath() + " is not part of a project using qrex", nullptr);
+  }
+  if (file.translated) return;
+  file.translated = true;
+  const std::string target = file.host.TranslatedPath(file);
+  if (IsTranslatedKind(file.file.kind)) {
+    WriteTranslation(file, target);
+  } else if (file.needsWriting) {
+    file.needsWriting = false;
+    const int64_t readTime = CurrentFileTime();
+    if (CopySource(file, target)) file.translationTime = readTime;
+    file.latestTargetTime = file.targetTime = 0;
+  }
+}
+
+}  // namespace qrex

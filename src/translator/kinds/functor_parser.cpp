@@ -1,0 +1,148 @@
+#include "translator/kinds/functor_parser.h"
+
+#include "translator/emit/emit.h"
+#include "translator/emit/records.h"
+#include "translator/kinds/functor_def.h"
+#include "translator/kinds/functor_emission.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+void ParseFunctor(QrexParser& parser, bool nested) {
+  parser.Advance();
+  auto made = std::make_unique<FunctorDef>(parser.file, parser.SourcePosition());
+  FunctorDef& def = *made;
+  def.parent = &parser.Current();
+  def.m_nested = nested;
+  parser.ParseExportModifier(def);
+  if (parser.Is(kShiftLeft)) {
+    parser.ParseQualifiers(def);
+    parser.CheckRedundant(def);
+  }
+  parser.ParseFunctionSignature(def.signature, false, false, false, def.m_reflected);
+  def.name = def.signature.name;
+  def.metadata = def.signature.metadata;
+  if (NameSpaceElement* found = parser.Current().Lookup(def.name)) parser.FailConflict("functor", def.name, *found);
+  def.ForgetQualifiedName();
+  parser.Current().Add(std::move(made));
+  parser.CheckPublicHeader(def);
+  parser.DropToCurrent();
+  parser.RequireSemicolonAfter(def);
+  WriteFunctorClass(parser.out, def);
+  if (!def.m_nested) WriteTypeTraits(parser.out, def);
+  parser.Flush();
+  parser.CheckReferences(def);
+  parser.CheckMetadata(def);
+}
+
+// --- Instances
+
+namespace {
+
+// One $makefunctor or $makeconstfunctor: NAME INSTANCE [(object, base)] { body }.
+class MakeFunctor {
+ public:
+  explicit MakeFunctor(QrexParser& parser) : m_parser(parser), m_out(parser.out) {}
+
+  void Parse() {
+    m_isConst = m_parser.Is("makeconstfunctor");
+    m_parser.Advance();
+    const NameSpaceElement& element = m_parser.ParseQualifiedId();
+    if (element.category != Category::Functor) m_parser.FailExpected("functor identifier");
+    m_functor = static_cast<const FunctorDef*>(&element);
+    m_name = m_parser.RequireIdentifier();
+    const bool isBound = m_parser.Is(kOpenParen);
+    if (isBound) ReadBinding();
+    if (!m_parser.Is(kOpenBrace)) m_parser.FailExpected("{");
+    ReadBody();
+    if (isBound) {
+      WriteBound();
+    } else {
+      WritePlain();
+    }
+    m_parser.Flush();
+    m_parser.DropBehindCurrent();
+  }
+
+ private:
+  void ReadBinding() {
+    m_object = m_parser.ReadArgumentText();
+    if (!m_parser.Is(kComma)) m_parser.FailExpected(",");
+    m_base = m_parser.ReadArgumentText();
+    m_parser.Expect(kCloseParen, ")");
+  }
+
+  // The indentation of the body's first line is taken from each of its lines.
+  void ReadBody() {
+    const char* begin = m_parser.current.text.end;
+    m_parser.SkipToMatching(kOpenBrace, kCloseBrace, "Met EOS before read matching brace");
+    const char* const end = m_parser.current.text.begin;
+    int indent = 0;
+    for (; begin < end && (*begin == ' ' || *begin == '\t' || *begin == '\n'); ++begin) {
+      indent = *begin == '\n' ? 0 : indent + (*begin == '\t' ? 4 : 1);
+    }
+    const char* last = end;
+    while (last > begin && (last[-1] == ' ' || (last[-1] >= 9 && last[-1] <= 13))) --last;
+    for (const char* at = begin; at < last; ++at) {
+      m_body += *at;
+      if (*at != '\n') continue;
+      for (int column = 0; column < indent && at + 1 < last && (at[1] == ' ' || at[1] == '\t'); ++at) {
+        column += at[1] == '\t' ? 4 : 1;
+      }
+    }
+  }
+
+  const FunctionSignature& Signature() const { return m_functor->signature; }
+
+  void WriteStaticDelegate() {
+    m_out << "static ";
+    WriteSelfSignature(m_out, Signature(), "__stdcall static_delegate");
+    m_out << "\n";
+  }
+
+  void WritePlain() {
+    m_out << "struct " << m_name << "_delegator\n";
+    {
+      Block body(m_out, ";");
+      WriteStaticDelegate();
+      Block code(m_out);
+      m_out << m_body << "\n";
+    }
+    WriteText(m_out, "\n$0 $1(NULL,$1_delegator::static_delegate);", {m_functor->GetQualifiedName(), m_name});
+  }
+
+  void WriteBound() {
+    m_out << "struct " << m_name << "_delegator : public " << m_base << "\n";
+    {
+      Block body(m_out, ";");
+      PrintType(m_out, Signature().returnType);
+      m_out << " member_delegate(";
+      WriteArgDeclarations(m_out, Signature().arguments);
+      m_out << ")" << (Signature().isConst ? " const" : "") << (m_isConst ? " const" : "") << "\n";
+      {
+        Block code(m_out);
+        m_out << m_body << "\n";
+      }
+      WriteStaticDelegate();
+      Block code(m_out);
+      WriteReturn(m_out, Signature().returnType);
+      m_out << "static_cast<" << m_name << "_delegator*>(_self)->member_delegate(";
+      WriteArgNames(m_out, Signature().arguments);
+      m_out << ");\n";
+    }
+    const std::string object = m_isConst ? "const_cast<" + m_base + "*>(" + m_object + ")" : m_object;
+    WriteText(m_out, "\n$0 $1($2,$1_delegator::static_delegate);", {m_functor->GetQualifiedName(), m_name, object});
+  }
+
+  QrexParser& m_parser;
+  TextWriter& m_out;
+  bool m_isConst = false;
+  const FunctorDef* m_functor = nullptr;
+  std::string m_name, m_object, m_base, m_body;
+};
+
+}  // namespace
+
+void ParseMakeFunctor(QrexParser& parser) { MakeFunctor(parser).Parse(); }
+
+}  // namespace qrex

@@ -1,0 +1,65 @@
+#include "translator/kinds/type_registration.h"
+
+#include "translator/emit/byte_code.h"
+#include "translator/emit/emit.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+void ParseType(QrexParser& parser) {
+  parser.RequireIObjectImport();
+  parser.Advance();
+  bool registered = parser.ParseExportModifier();
+  bool reflected = registered;
+  if (parser.Is(kShiftLeft)) parser.ParseQualifierFlags(reflected, registered, " >> on $type");
+  TypeCode code;
+  if (!parser.ParseTypeWithName(code, nullptr, false, nullptr, reflected)) {
+    parser.Fail("Type expected when read " + Printed(parser.current));
+  }
+  const std::string type = TypeText(code);
+  const Project& project = parser.GetProject();
+  const std::string api =
+      registered && project.targetType == TargetType::DynamicLinkLibrary ? project.name + "_API " : std::string();
+  if (registered) parser.file.typeRegistrations.push_back({code, &parser.Current()});
+  parser.out << api << "vesk::ReflectionByteCode _GetReflected(" << type << " const*);\n";
+  parser.out << api << "vesk::TypeOps const& _GetTypeOps(" << type << " const*);\n";
+  parser.Flush();
+  parser.DropBehindCurrent();
+  if (!parser.Is(kSemicolon)) {
+    parser.Fail("; expected after $type " + type + " when read " + Printed(parser.current));
+  }
+}
+
+void WriteTypeRegistration(TextWriter& out, const TypeRegistration& registration, RegistrationLists& lists) {
+  const std::string type = TypeText(registration.code);
+  const std::string mangled = MangledType(registration.code);
+  std::string name;
+  for (const NameSpace* nameSpace : EnclosingNameSpaces(registration.scope)) name += nameSpace->name + "::";
+  lists.registerNames.push_back(name + mangled);
+
+  NameSpaceFrame frame(out, registration.scope);
+  out << "vesk::ReflectionByteCode _GetReflected(" << type << " const*)\n";
+  {
+    Block body(out);
+    StringTable strings;
+    WriteTypeByteCode(out, "bc", strings, registration.code);
+    WriteStringTable(out, strings, "");
+    out << "return vesk::ReflectionByteCode(bc," << (strings.Empty() ? "NULL" : "_stringTable") << ");\n";
+  }
+  out << "vesk::TypeOps const& _GetTypeOps(" << type << " const*)\n";
+  {
+    Block body(out);
+    out << "static vesk::TypeOps typeOps =\n";
+    {
+      Block record(out, ";");
+      WriteTypeOps(out, type, kOpsAll);
+    }
+    out << "return typeOps;\n";
+  }
+  out << "void _Register_" << mangled << "()\n";
+  Block body(out);
+  out << "vxVerify(vesk::RegisterTypeOps(vesk::ReflectionByteCodeValue(_GetReflected((" << type
+      << "*)0)),&_GetTypeOps((" << type << "*)0)));\n";
+}
+
+}  // namespace qrex
