@@ -5,7 +5,7 @@
 #include <string_view>
 #include <vector>
 
-#include "driver/config_settings.h"
+#include "workspace/config_settings.h"
 
 namespace qrex {
 

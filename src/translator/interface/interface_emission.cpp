@@ -255,7 +255,7 @@ class InterfaceRecord {
 void InterfaceDef::WriteReflectedDefinition(TextWriter& out) { InterfaceRecord(out, *this).Write(); }
 
 void InterfaceDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
-  NameSpaceElement::WriteReflection(out, lists);
+  RecordedElement::WriteReflection(out, lists);
   if (status == DeclStatus::Defined && m_isIpc) WriteRemoteInterface(out, *this);
 }
 
