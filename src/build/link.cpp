@@ -88,7 +88,9 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
   for (const std::string& input : inputs) text += " \"" + input + "\"";
   if (builder.project.targetType == TargetType::StaticLibrary) return text;
   std::string libraryDirectory;
-  if (FullPathOf(builder.LibraryDirectory(), libraryDirectory)) text += " \"-Wl,-rpath," + libraryDirectory + "\"";
+  if (FullPathOf(builder.LibraryDirectory(), libraryDirectory)) {
+    text += " -Xlinker -rpath -Xlinker \"" + libraryDirectory + "\"";  // a comma would end the path behind -Wl
+  }
   for (const std::string& token : LinkerTokens(builder.config.linkerText)) text += " " + token;
   return text;
 }

@@ -46,6 +46,7 @@ class ConfigParser : public MpfwParser {
   void ParseList(std::vector<std::string>& list);
   bool ReadAssignment();  // `=` or `+=`; true: the list starts anew
   std::string ReadWord();
+  void ReadName(std::string& out);  // of what stands in quotes on command lines
   void SplitTargetDirectory(const std::string& path);
 
   ConfigSettings& m_settings;
@@ -78,7 +79,8 @@ void ConfigParser::ParseStatement() {
   if (const auto* key = FindRow(kStringKeys, current)) {
     Advance();
     Expect(kAssign, "=");
-    return ReadStringOrExpression(m_settings.*key->field);
+    const bool isName = key->field == &ConfigSettings::config || key->field == &ConfigSettings::platform;
+    return isName ? ReadName(m_settings.*key->field) : ReadStringOrExpression(m_settings.*key->field);
   }
   if (const auto* key = FindRow(kBoolKeys, current)) {
     Advance();
@@ -100,12 +102,20 @@ std::string ConfigParser::ReadWord() {
   return word;
 }
 
+void ConfigParser::ReadName(std::string& out) {
+  const LexToken token = current;
+  ReadStringOrExpression(out);
+  RequireNoQuote(out, token);
+}
+
 void ConfigParser::ParseVariable() {
   std::string name, value;
   ParseVariableStatement(&name, &value);
   TraceWriter() << "$" << name << " = " << value << "\n";
   for (const auto& variable : kPathVariables) {
-    if (name == variable.word) m_settings.*variable.field = value;
+    if (name != variable.word) continue;
+    RequireNoQuote(value, previous);
+    m_settings.*variable.field = value;
   }
   if (name == "COMPILE_FILE_PATH") m_settings.compileFilePath = NormalisePath(value);
   if (name == "TARGET_DIR" && !value.empty()) SplitTargetDirectory(NormalisePath(value));
@@ -157,7 +167,7 @@ void ConfigParser::ParseList(std::vector<std::string>& list) {
   if (ReadAssignment()) list.clear();
   while (current.kind != kCloseBrace) {
     std::string entry;
-    ReadStringOrExpression(entry);
+    ReadName(entry);
     list.push_back(std::move(entry));
   }
   Advance();

@@ -69,6 +69,11 @@ void MpfwParser::ReadString(std::string& out) {
   SubstituteVariables(out);
 }
 
+void MpfwParser::RequireNoQuote(const std::string& name, const LexToken& token) {
+  if (name.find('"') == std::string::npos) return;
+  throw LexScannerException("A double quote can't stand in " + Printed(token), token);
+}
+
 namespace {
 
 void CheckPath(const std::string& path, const LexToken& token) {
@@ -76,6 +81,7 @@ void CheckPath(const std::string& path, const LexToken& token) {
     throw LexScannerException("Forward slashes must be used in " + Printed(token), token);
   }
   if (!platform::IsValidUtf8(path)) throw LexScannerException("Path is not valid UTF-8 : " + Printed(token), token);
+  MpfwParser::RequireNoQuote(path, token);
 }
 
 }  // namespace

@@ -49,8 +49,10 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   MpfwSourceFile* LoadSourceFile(const std::string& path, const std::string& extraText = {});
 
   void SubstituteVariables(std::string& text) const;
-  void ReadString(std::string& out);              // does not advance
-  void ReadPath(std::string& out);                // does not advance
+  void ReadString(std::string& out);  // does not advance
+  void ReadPath(std::string& out);    // does not advance
+  // Names and paths stand in quotes on the command lines of tools.
+  static void RequireNoQuote(const std::string& name, const LexToken& token);
   void ReadStringOrExpression(std::string& out);  // advances
   void ReadNamedString(const std::string& name, std::string& out);
   void ReadNamedPath(const std::string& name, std::string& out);

@@ -148,6 +148,42 @@ int RunBatchFile(std::string path) {
   return !IsReadOnlyFile(target) && WriteFile(target, text + "\n") ? 0 : 1;
 }
 
+bool IsPlainInShell(char c) {
+  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || (c & 0x80) != 0 ||
+         std::string_view("_@%+=:,./-").find(c) != std::string_view::npos;
+}
+
+// The line for the shell, in which more characters have a meaning than in the interpreter that it was written for.
+std::string ForShell(std::string_view line) {
+  std::string text;
+  bool isQuoted = false, isWordStart = true;
+  for (; !line.empty(); line.remove_prefix(1)) {
+    const char c = line.front();
+    if (!isQuoted && isWordStart && (line.starts_with("1>") || line.starts_with("2>"))) {
+      const size_t length = line.starts_with("2>&1") ? 4 : 2;
+      text += line.substr(0, length);
+      line.remove_prefix(length - 1);
+      continue;
+    }
+    isWordStart = !isQuoted && (c == ' ' || c == '\t' || c == '\n' || c == '\r');
+    if (line.starts_with("\\\"")) {  // a tool's own way to write a quote
+      text += line.substr(0, 2);
+      line.remove_prefix(1);
+    } else if (c == '"') {
+      text += c;
+      isQuoted = !isQuoted;
+    } else if (isWordStart) {
+      text += ' ';
+    } else {
+      const bool hasMeaning =
+          isQuoted ? std::string_view("$`\\").find(c) != std::string_view::npos : !IsPlainInShell(c);
+      if (hasMeaning) text += '\\';
+      text += c;
+    }
+  }
+  return text;
+}
+
 }  // namespace
 
 int RunCommand(const std::string& line) {
@@ -162,7 +198,7 @@ int RunCommand(const std::string& line) {
     return RunBatchFile(command.substr(1, command.size() - 2));
   }
   FlushStdout();
-  const int status = std::system(command.c_str());
+  const int status = std::system(ForShell(command).c_str());
   if (status == -1) return -1;
   return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
 }

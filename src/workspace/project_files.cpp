@@ -123,6 +123,10 @@ void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFo
   search.open.push_back(realPath);
   std::vector<std::string> names;
   FileOrDirIterator entries(searched + "/*");
+  if (entries.FailureCode() != 0) {
+    throw LexScannerException("Couldn't list folder " + searched + " : " + SystemErrorText(entries.FailureCode()),
+                              current);
+  }
   while (const IFileOrDirInfo* entry = entries.Next()) {
     const std::string name = entry->Name();
     if (name == "." || name == ".." || entry->IsHidden() || entry->IsSystem()) continue;
@@ -131,6 +135,9 @@ void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFo
     if (!isWanted) continue;
     if (!platform::IsValidUtf8(name)) {
       throw LexScannerException("Path is not valid UTF-8 : " + PathJoin(directory, name), current);
+    }
+    if (name.find('"') != std::string::npos) {
+      throw LexScannerException("A double quote can't stand in " + PathJoin(directory, name), current);
     }
     if (entry->IsDirectory()) {
       FindInSubdirectory(search, folder, directory, name);
@@ -164,6 +171,7 @@ void ProjectParser::ParseName(ProjectFolder& folder, const std::string& director
   if (hasDisplayName) {
     Advance();
     ReadString(displayName);
+    RequireNoQuote(displayName, current);
     Advance();
   }
   if (current.kind == kOpenBrace) {

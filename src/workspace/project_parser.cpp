@@ -169,6 +169,7 @@ ProjectConfig& ProjectParser::AddConfig() {
   if (bar == std::string::npos || specifier.find('|', bar + 1) != std::string::npos) {
     throw LexScannerException("Config specifier " + Printed(current) + " must be of the form name|platform", current);
   }
+  RequireNoQuote(specifier, current);
   m_project.configs.push_back(std::make_unique<ProjectConfig>());
   ProjectConfig& config = *m_project.configs.back();
   config.name = specifier.substr(0, bar);

@@ -109,8 +109,8 @@ def messages_point_at_the_source(workspace):
     output = workspace.run("all.qrex")
     # Each file that imports the header reports it, at the line of the source. Compiling goes on, nothing is linked.
     holds(output, "tree/base/numbers.h(13) ...\n", "qrexsource/x64/Debug/base/numbers.h:",
-          ": error: ‘nowhere’ was not declared in this scope\n", "- app  [",
-          "tree/app/src/parts.cpp(6) ...\n", "warning: ‘unused’ defined but not used",
+          ": error: 'nowhere' was not declared in this scope\n", "- app  [",
+          "tree/app/src/parts.cpp(6) ...\n", "warning: 'unused' defined but not used",
           "\nCompleted with 1 warnings, 3 errors.")
     equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/parts.o", "x64/Debug/base/base.o",
                                              "x64/Debug/shape/area.o"])
@@ -126,7 +126,7 @@ def link_errors_are_counted_and_leave_no_target(workspace):
     output = workspace.run("all.qrex")
     holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
           "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
-          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" \"-Wl,-rpath,",
+          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker \"",
           "/out/lib/x64/Debug\" -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
           "\nCompleted with 0 warnings, 1 errors.")
     assert not workspace.path(PROGRAM).exists()
