@@ -6,6 +6,7 @@
 #include "build/reflection_tails.h"
 #include "build/staleness.h"
 #include "build/tools.h"
+#include "platform/system.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
@@ -42,16 +43,24 @@ bool ProjectBuilder::RegisterGuid(const guid& id, const std::string& owner, std:
   return isNew;
 }
 
-bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
-  if (!position) return false;
+const ScannedFile* ProjectBuilder::FileOfPosition(const char* position) const {
+  const auto holds = [position](const ScannedFile& file) {
+    return file.translated && TextRange(std::string_view(file.sourceText)).Contains(position);
+  };
+  if (m_lastPositioned && holds(*m_lastPositioned)) return m_lastPositioned;  // messages come in runs
   for (const auto& [name, file] : scannedByPath) {
-    const TextRange text{std::string_view(file->sourceText)};
-    if (!file->translated || !text.Contains(position)) continue;
-    path = file->SourcePath();
-    line = LineOfPosition(text, position);
-    return true;
+    if (holds(*file)) return m_lastPositioned = file.get();
   }
-  return false;
+  return nullptr;
+}
+
+bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
+  const ScannedFile* const file = position ? FileOfPosition(position) : nullptr;
+  if (!file) return false;
+  path = file->SourcePath();
+  const auto table = m_lineStarts.try_emplace(file, TextRange(std::string_view(file->sourceText))).first;
+  line = table->second.LineOf(position);
+  return true;
 }
 
 std::string ProjectBuilder::TranslatedPath(const ProjectFile& file) const {
@@ -70,6 +79,8 @@ void ProjectBuilder::WriteHeading(std::string_view end) const {
 bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile* singleFile) {
   const bool isBuild = settings.mode == RunMode::Build;
   if (!settings.translateOnly && settings.Environment()) ApplyEnvironment(*settings.Environment());
+  // What these print is searched for words.
+  if (RunsTools() && IsGccFamily(settings.compiler)) platform::SetEnvironment("LC_ALL", "C");
   WriteHeading("\n");
   if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
   PrepareFiles(dependencyFile);

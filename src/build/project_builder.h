@@ -74,12 +74,15 @@ class ProjectBuilder : public TranslationHost {
   bool CompileIfStale(ScannedFile& file);
   void ReportUnregistered() const;
   bool LinkIfStale();
+  const ScannedFile* FileOfPosition(const char* position) const;  // whose source text holds it; or null
   void Save(const std::string& dependencyFile);
 
   const std::string m_translationDirectory, m_intermediateDirectory;
   std::map<guid, std::string> m_guidOwners;
   std::unordered_map<std::string, int64_t> m_objectTimes;  // as the compile steps know them
   size_t m_nextFileIndex = 0;
+  mutable const ScannedFile* m_lastPositioned = nullptr;
+  mutable std::unordered_map<const ScannedFile*, LineStarts> m_lineStarts;  // of those that messages were about
 };
 
 // Copies what stands outside the project's `src` folder to the export directories, translated and as it is.

@@ -10,6 +10,7 @@
 #include "generators/exported_project.h"
 #include "generators/generate.h"
 #include "platform/console.h"
+#include "platform/folder_lock.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
@@ -406,10 +407,27 @@ bool CheckPathSyntax(const ConfigSettings& settings) {
   return true;
 }
 
+namespace {
+
+// Tools of two builds in one folder would write over each other's objects and captured output.
+void WaitForOtherBuilds(platform::FolderLock& folder) {
+  if (folder.TryToTake()) return;
+  const uint64_t holder = folder.Holder();
+  TraceWriter() << "Waiting for " << (holder == 0 ? "another process" : "process " + std::to_string(holder))
+                << ", which builds in this folder\n";
+  platform::FlushStdout();
+  folder.Take();
+}
+
+}  // namespace
+
 bool RunWorkspace(ConfigSettings& settings) {
   ScopeTimer timer;
   WriteOpening(settings);
   if (!CheckPathSyntax(settings)) return false;
+  platform::FolderLock folder(".");
+  const bool builds = settings.mode == RunMode::Build || settings.mode == RunMode::Compile;
+  if (builds && !settings.translateOnly) WaitForOtherBuilds(folder);
   // Left to the end of the process: to take a large workspace apart would cost a tenth of the run.
   static auto& runs = *new std::vector<std::unique_ptr<WorkspaceRun>>;
   WorkspaceRun& run = *runs.emplace_back(std::make_unique<WorkspaceRun>(settings));

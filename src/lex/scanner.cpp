@@ -5,6 +5,7 @@
 
 #include "lex/scanner.h"
 
+#include <algorithm>
 #include <array>
 #include <cstring>
 
@@ -147,6 +148,18 @@ int64_t LineOfPosition(const TextRange& text, const char* position) {
     at = static_cast<const char*>(lineFeed) + 1;
   }
   return line;
+}
+
+LineStarts::LineStarts(const TextRange& text) : m_text(text), m_starts{text.begin} {
+  const char* at = text.begin;
+  while (const void* lineFeed = std::memchr(at, '\n', static_cast<size_t>(text.end - at))) {
+    m_starts.push_back(at = static_cast<const char*>(lineFeed) + 1);
+  }
+}
+
+int64_t LineStarts::LineOf(const char* position) const {
+  if (!m_text.Contains(position)) return -1;
+  return std::upper_bound(m_starts.begin(), m_starts.end(), position) - m_starts.begin();
 }
 
 bool SameTokens(LexScanner a, LexScanner b) {

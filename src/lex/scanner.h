@@ -3,6 +3,7 @@
 
 #include <string>
 #include <string_view>
+#include <vector>
 
 #include "lex/byte_class.h"
 #include "lex/token.h"
@@ -71,7 +72,17 @@ inline LexToken NextToken(LexScanner& scanner, bool keepComments = false) {
 
 bool SkipDigits(LexScanner& scanner);
 int64_t LineOfPosition(const TextRange& text, const char* position);  // 1-based; -1 outside
-bool SameTokens(LexScanner a, LexScanner b);                          // same kinds and texts, comments dropped
+// The same for many positions in one text, which must stay where it is.
+class LineStarts {
+ public:
+  explicit LineStarts(const TextRange& text);
+  int64_t LineOf(const char* position) const;
+
+ private:
+  TextRange m_text;
+  std::vector<const char*> m_starts;
+};
+bool SameTokens(LexScanner a, LexScanner b);  // same kinds and texts, comments dropped
 
 class ParserBase {
  public:

@@ -10,6 +10,7 @@
 #include <boost/filesystem.hpp>
 #include <cerrno>
 #include <cstdio>
+#include <ctime>
 
 #include "platform/error.h"
 
@@ -80,6 +81,12 @@ bool Stat(const std::string& path, FileInfo& info) {
   info.name = path.substr(path.rfind('/') + 1);
   info.isHidden = !info.name.empty() && info.name.front() == '.';
   return true;
+}
+
+int64_t CurrentStamp() {
+  timespec now;
+  clock_gettime(CLOCK_REALTIME_COARSE, &now);
+  return FileTime(now);
 }
 
 DirectoryTimes::DirectoryTimes(const std::string& directory)
@@ -210,22 +217,29 @@ bool RealPath(const std::string& path, std::string& out) {
 
 namespace {
 
+// False when the directory could not be listed to its end.
 template <typename Take>
-void ForEachEntry(const std::string& directory, Take take) {
+bool ForEachEntry(const std::string& directory, Take take) {
   SetLastError(0);
   DIR* handle = opendir(directory.empty() ? "." : directory.c_str());
-  if (!handle) return;
-  while (const dirent* entry = readdir(handle)) take(*entry);
+  if (!handle) return false;
+  errno = 0;
+  while (const dirent* entry = readdir(handle)) {
+    take(*entry);
+    errno = 0;
+  }
+  const int failure = errno;
   closedir(handle);
+  errno = failure;
+  return failure == 0;
 }
 
 }  // namespace
 
-std::vector<std::string> EntryNames(const std::string& directory) {
-  std::vector<std::string> names;
-  ForEachEntry(directory, [&](const dirent& entry) { names.emplace_back(entry.d_name); });
+bool EntryNames(const std::string& directory, std::vector<std::string>& names) {
+  const bool listed = ForEachEntry(directory, [&](const dirent& entry) { names.emplace_back(entry.d_name); });
   std::sort(names.begin(), names.end());
-  return names;
+  return listed;
 }
 
 std::vector<std::string> PlainFileNames(const std::string& directory) {

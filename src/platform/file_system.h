@@ -27,6 +27,8 @@ struct FileInfo {
 };
 
 bool Stat(const std::string& path, FileInfo& info);
+// The stamp that a file gets which is written now: the clock of stamps moves in ticks, behind that of the system.
+int64_t CurrentStamp();
 
 // The write times of many files of one directory: cheaper than to walk each whole path. 0 for a file that is not there
 // and for what is no plain file.
@@ -60,8 +62,8 @@ bool SetReadOnlyAttribute(const std::string& path, bool readOnly);
 bool StampNow(const std::string& path);
 bool CopyExecuteBits(const std::string& from, const std::string& to);
 bool FullPath(const std::string& path, std::string& out);
-bool RealPath(const std::string& path, std::string& out);               // with symbolic links resolved
-std::vector<std::string> EntryNames(const std::string& directory);      // "." and ".." included, in byte order
-std::vector<std::string> PlainFileNames(const std::string& directory);  // plain files alone, in no order
+bool RealPath(const std::string& path, std::string& out);                        // with symbolic links resolved
+bool EntryNames(const std::string& directory, std::vector<std::string>& names);  // with "." and "..", in byte order
+std::vector<std::string> PlainFileNames(const std::string& directory);           // plain files alone, in no order
 
 }  // namespace qrex::platform

@@ -160,6 +160,13 @@ bool TouchFile(const std::string& path, bool create) {
   return platform::StampNow(path);
 }
 
+int64_t CurrentStamp() { return platform::CurrentStamp(); }
+
+int64_t OnScaleOf(int64_t stamp, int64_t time) {
+  constexpr int64_t kSecond = 10'000'000;
+  return stamp % kSecond == 0 ? time - time % (2 * kSecond) : time;
+}
+
 bool FullPathOf(const std::string& path, std::string& out) { return platform::FullPath(Checked(path), out); }
 bool RealPathOf(const std::string& path, std::string& out) { return platform::RealPath(Checked(path), out); }
 bool ReadWholeFile(std::string& out, const std::string& path) { return platform::ReadFile(Checked(path), out); }
@@ -359,14 +366,19 @@ struct FileOrDirIterator::State {
   std::string directory;
   std::vector<std::string> names;
   size_t next = 0;
+  uint32_t failureCode = 0;
   FileOrDirInfo info;
 };
 
 FileOrDirIterator::FileOrDirIterator(const std::string& pattern) : m_state(std::make_unique<State>()) {
   const size_t slash = Checked(pattern).rfind('/');
   m_state->directory = slash == std::string::npos ? "." : pattern.substr(0, slash);
-  m_state->names = platform::EntryNames(slash == 0 ? "/" : m_state->directory);
+  if (!platform::EntryNames(slash == 0 ? "/" : m_state->directory, m_state->names)) {
+    m_state->failureCode = platform::LastError();
+  }
 }
+
+uint32_t FileOrDirIterator::FailureCode() const { return m_state->failureCode; }
 
 FileOrDirIterator::~FileOrDirIterator() = default;
 

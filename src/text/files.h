@@ -49,6 +49,10 @@ class FileTimes {
 };
 std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths);  // of many files, by several threads
 bool TouchFile(const std::string& path, bool create);
+int64_t CurrentStamp();  // that a file gets which is written now, on a file system with fine stamps
+// A time that was taken by this clock as the file system would have stamped it which gave `stamp`: some keep whole
+// seconds or two.
+int64_t OnScaleOf(int64_t stamp, int64_t time);
 bool FullPathOf(const std::string& path, std::string& out);
 bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
 bool ReadWholeFile(std::string& out, const std::string& path);
@@ -125,6 +129,7 @@ class FileOrDirIterator {
   explicit FileOrDirIterator(const std::string& pattern);  // "dir/*"
   ~FileOrDirIterator();
   const IFileOrDirInfo* Next();  // null at the end; valid until the next call
+  uint32_t FailureCode() const;  // of the system, when the directory could not be listed; else 0
 
  private:
   struct State;

@@ -107,7 +107,7 @@ int WriteIfChanged(MemoryTextWriter& writer, const std::string& path) {
 }
 
 void ChangeReadOnly(const std::string& path, bool readOnly) {
-  if (SetReadOnly(path, readOnly) || !FileExists(path)) return;
+  if (SetReadOnly(path, readOnly) || platform::IsNotFound(platform::LastError()) || !FileExists(path)) return;
   TraceWriter() << "Failure " << (readOnly ? "setting" : "clearing") << " read only status of file " << path << "\n";
 }
 
@@ -119,7 +119,12 @@ bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly) 
   };
   platform::FileInfo source;
   if (!platform::Stat(from, source)) return platform::IsNotFound(platform::LastError()) || fail();
-  if (!source.isPlain || source.writeTime <= LastWriteTime(to)) return true;
+  platform::FileInfo target;
+  const bool exists = platform::Stat(to, target) && target.isPlain;
+  if (!source.isPlain || source.writeTime <= (exists ? target.writeTime : 0)) {
+    if (exists && readOnly && !target.isReadOnly) ChangeReadOnly(to, true);  // a run was killed behind its copy
+    return true;
+  }
   ChangeReadOnly(to, false);
   if (!CopyFile(from, to, false)) return fail();
   TouchFile(to, false);

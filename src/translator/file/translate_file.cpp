@@ -1,12 +1,12 @@
 #include "translator/file/translate_file.h"
 
+#include <algorithm>
 #include <unordered_set>
 
 #include "lex/scanner.h"
 #include "macro/expand.h"
 #include "text/files.h"
 #include "text/output_policy.h"
-#include "text/scope_timer.h"
 #include "text/trace.h"
 #include "translator/file/keywords.h"
 #include "translator/file/predefined_variables.h"
@@ -179,9 +179,16 @@ void HoldTails(ScannedFile& file, const std::vector<ScannedFile*>& oldImports) {
   }
 }
 
-// The time of the translation is that of the reading: what is edited while it runs is stale in the next run.
+// The time of a translation is that of the reading, so that what is edited while it runs is stale in the next run. It
+// is compared with stamps of sources: a file system whose clock is behind, or moves in seconds, shows in what was
+// written.
+int64_t TranslationTime(const std::string& target, int64_t readTime, bool isWritten) {
+  const int64_t stamp = LastWriteTime(target);
+  return OnScaleOf(stamp, isWritten ? std::min(readTime, stamp) : readTime);
+}
+
 void WriteTranslation(ScannedFile& file, const std::string& target) {
-  const int64_t readTime = CurrentFileTime();
+  const int64_t readTime = CurrentStamp();
   if (!LoadText(file.sourceText, file.SourcePath(), true)) {
     throw LexScannerException("Couldn't open file " + file.SourcePath(), nullptr)
         .WithHint(file.file.project->ListingHint(file.file));
@@ -200,17 +207,18 @@ void WriteTranslation(ScannedFile& file, const std::string& target) {
   if (!file.needsWriting) return;
 
   const ConfigSettings& settings = file.host.Settings();
-  if (!settings.writeTokenEquivalent && IsTokenEquivalent(target, generated)) {
+  const bool isWritten = settings.writeTokenEquivalent || !IsTokenEquivalent(target, generated);
+  if (!isWritten) {
     if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
   } else {
     if (settings.diagnostics) TraceWriter() << "Writing: " << target << "\n";
     PrepareTarget(target);
     generated.Commit();
-    if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
   }
+  if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
   file.needsWriting = false;
   file.latestTargetTime = file.targetTime = 0;
-  file.translationTime = readTime;
+  file.translationTime = TranslationTime(target, readTime, isWritten);
   HoldTails(file, knownImports);
 }
 
@@ -243,8 +251,8 @@ void BringUpToDate(ScannedFile& file) {
     WriteTranslation(file, target);
   } else if (file.needsWriting) {
     file.needsWriting = false;
-    const int64_t readTime = CurrentFileTime();
-    if (CopySource(file, target)) file.translationTime = readTime;
+    const int64_t readTime = CurrentStamp();
+    if (CopySource(file, target)) file.translationTime = TranslationTime(target, readTime, true);
     file.latestTargetTime = file.targetTime = 0;
   }
 }
