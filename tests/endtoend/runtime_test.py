@@ -36,11 +36,31 @@ def compile_with_clang(workspace, projects, flags):
             workspace.shell(f"clang++ -std=c++17 -fsyntax-only -Wall -Werror {flags} {include} {source}")
 
 
+# An object whose class only inherits being one.
+INHERITED = """#include "check/src/nodes.h"
+struct More : Kept { std::string text; };
+vesk::ptr<vesk::IObject> More() { return new struct More(); }
+"""
+
+# Names that a C header may have, and warnings that are the user's.
+NEIGHBOUR = """extern "C" { typedef long long int64; typedef unsigned char uint8; }
+#include "check/src/nodes.h"
+vesk::int64 Sum(vesk::int64 a, ::vesk::uint8 b) { return a + b; }
+"""
+
+
 def test_every_kind(binary):
     with build(binary, HERE / "runtime" / "tree", "all.qrws") as workspace:
         output = workspace.shell("out/lib/x64/Debug/check")
-        holds(output, " checks, 0 failures\n")
-        assert int(output.split()[-4]) > 150, output
+        holds(output, " checks, 0 failures\n", "last\n")
+        assert int(output.split()[-5]) > 250, output
+        for compiler in ("g++", "clang++"):
+            need(compiler)
+            compile_one = f"{compiler} -std=c++17 -fsyntax-only -Dshapes_API= -Iqrexsource/x64/Debug -Wno-deprecated-declarations "
+            workspace.write("inherited.cpp", INHERITED)
+            holds(workspace.shell(compile_one + "inherited.cpp", status=1), "archived, collected and destroyed as that base")
+            workspace.write("neighbour.cpp", NEIGHBOUR)
+            workspace.shell(compile_one + "-Wall -Werror neighbour.cpp")
         # What generated text is warned of: the comparison of structs in variants, what is passed by [copy].
         compile_with_clang(workspace, ["Vesk/vxObject", "shapes", "kinds", "check"],
                            "-Dshapes_API= -Wno-logical-op-parentheses -Wno-deprecated-declarations")

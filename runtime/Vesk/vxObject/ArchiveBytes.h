@@ -2,13 +2,12 @@
 // compact: up to 7, 14, 21 or 28 bits in 1 to 4 bytes, anything larger in 5. What is read may have been written by
 // anyone: the reader refuses, with an ArchiveError, what its bytes cannot hold or its limits do not allow.
 
-@import "Vesk/vxObject/Handles.h"
+@import "Vesk/vxObject/Numbers.h"
 
 #include <algorithm>
 #include <cstdlib>
 #include <cstring>
 #include <stdexcept>
-#include <unordered_map>
 
 namespace vesk {
 
@@ -78,7 +77,7 @@ struct Archive {
   void Write(void const* data, std::size_t size) { m_bytes.Append(data, size); }
 
   ByteBuffer m_bytes;
-  std::unordered_map<void const*, uint32> m_objects;  // written so far, by number
+  WrittenObjects m_objects;
   bool m_writesAddresses = false;                     // of objects, in place of the objects
   bool m_hostOrder = false;                           // scalars as the host has them: for bytes that stay in memory
 };
@@ -119,15 +118,9 @@ struct InputArchive {
     if (++m_emptyElements > m_limits.m_emptyElements) throw ArchiveError("too many empty elements in an archive");
   }
 
-  struct ReadObject {
-    void* m_self;                // as cref<C> sees it
-    AnyInterface m_persistable;  // of an IPersistable object
-    void const* m_type;          // ArchivedType<C>() of its class
-  };
-
   xvector<octet_t> m_bytes;
   std::size_t m_position = 0;
-  xvector<ReadObject> m_objects;  // read so far, by number
+  ReadObjects m_objects;
   ArchiveLimits m_limits;
   std::size_t m_depth = 0;
   std::size_t m_emptyElements = 0;

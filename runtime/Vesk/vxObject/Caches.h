@@ -85,41 +85,56 @@ class DGAsyncNode : public DGNode {
     DGNode::operator=(rhs);
     return *this;
   }
-  ~DGAsyncNode() override {
-    for (EQueue queue : {Calculation, InputOutput}) Queue(queue).remove(this);
-  }
+  ~DGAsyncNode() override { Dequeue(); }
 
-  // Runs what waits now. Answers how many calculations ran.
+  // Runs what waits now in this thread. Answers how many calculations ran. One that throws ends it; its node is
+  // calculated again when it is next read.
   static ssize_t Run(EQueue queue) {
     ssize_t count = 0;
-    for (std::list<DGAsyncNode const*>& waiting = Queue(queue); !waiting.empty(); ++count) {
+    for (std::list<DGAsyncNode const*>& waiting = Queues::Get().m_waiting[queue]; !waiting.empty(); ++count) {
       DGAsyncNode const* node = waiting.front();
-      waiting.pop_front();
-      CalculationScope detached(nullptr);
-      if (node->CalculateOutput()) node->InvalidateDependents(true);
+      node->Dequeue();
+      vesk::Calculation detached(GraphState::Get(), nullptr);
+      bool isChanged;
+      try {
+        isChanged = node->CalculateOutput();
+      } catch (...) {
+        node->Invalidate(true);
+        throw;
+      }
+      if (isChanged) node->Change();
     }
     return count;
   }
-  bool IsWaiting() const {
-    std::list<DGAsyncNode const*> const& waiting = Queue(OwnQueue());
-    return std::find(waiting.begin(), waiting.end(), this) != waiting.end();
-  }
+  bool IsWaiting() const { return m_queues != nullptr; }
 
  protected:
   virtual bool CalculateOutput() const = 0;  // whether it changed
   void Enqueue() const {
-    if (!IsWaiting()) Queue(OwnQueue()).push_back(this);
+    if (IsWaiting()) return;
+    m_queues = &Queues::Get();
+    m_queues->Use();
+    std::list<DGAsyncNode const*>& waiting = m_queues->m_waiting[OwnQueue()];
+    m_place = waiting.insert(waiting.end(), this);
   }
 
  private:
+  struct Queues : PerThread<Queues> {
+    std::list<DGAsyncNode const*> m_waiting[2];
+  };
+
   EQueue OwnQueue() const { return HasFlag(DF_ASYNC_IO) ? InputOutput : Calculation; }
-  static std::list<DGAsyncNode const*>& Queue(EQueue queue) {
-    static std::list<DGAsyncNode const*>* const queues = new std::list<DGAsyncNode const*>[2];
-    return queues[queue];
+  void Dequeue() const {
+    if (!IsWaiting()) return;
+    m_queues->m_waiting[OwnQueue()].erase(m_place);
+    std::exchange(m_queues, nullptr)->Release();
   }
+
+  mutable Queues* m_queues = nullptr;  // where it waits
+  mutable std::list<DGAsyncNode const*>::iterator m_place;
 };
 
-// Both queues until nothing waits.
+// Both queues of this thread until nothing waits.
 inline ssize_t RunAsyncCalculations() {
   ssize_t count = 0;
   for (ssize_t more = 1; more > 0; count += more) {

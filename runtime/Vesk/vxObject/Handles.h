@@ -12,6 +12,22 @@ struct __attribute__((may_alias)) AnyInterface {
   void const* m_table = nullptr;
 };
 
+template <typename C>
+using FinalClassOf = typename C::FinalClass;
+
+// What an object answers about itself (its record, how it is archived, visited and destroyed) comes from its final
+// class: the one that its `isa` names its base after. A class that only inherits all that would be written, collected
+// and destroyed as its base, and what it adds would be lost. (A mixin is a part of its final class, and passes.)
+template <typename C>
+void AssertFinalClass() {
+  if constexpr (Detects<FinalClassOf, C>) {
+    typedef typename C::FinalClass Final;
+    static_assert(std::is_same<Final, C>::value || std::is_base_of<C, Final>::value,
+                  "This class derives from a class that is an object, but is none itself: it would be archived, "
+                  "collected and destroyed as that base. Share code by a mixin instead.");
+  }
+}
+
 // One use of a handle: what `p->` reaches.
 template <typename I>
 struct HandleAccess {
@@ -31,8 +47,11 @@ class ptr {
 
   // Any object whose class has the methods of I.
   template <typename C, typename = std::enable_if_t<std::is_class<C>::value>>
-  ptr(C* object) : m_self(const_cast<std::remove_const_t<C>*>(object)) {
-    if (object) m_table = &I::template Stubs<std::remove_const_t<C>>::GetTable();
+  ptr(C* object) {
+    typedef std::remove_const_t<C> Class;
+    AssertFinalClass<Class>();
+    m_self = const_cast<Class*>(object);
+    if (object) m_table = &I::template Stubs<Class>::GetTable();
   }
 
   // From an interface that derives from I.
@@ -64,6 +83,7 @@ class PersistentReference {
   void* Object() const { return m_self; }
 
  protected:
+  friend struct ReferenceCleaner;
   explicit PersistentReference(void* self) : m_self(self) {}
   void* m_self;
 };

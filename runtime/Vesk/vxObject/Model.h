@@ -3,8 +3,7 @@
 // readers dirty, and the hooks see each write just before it happens: with its path where the class generates
 // operations, with its name where it does not.
 
-@import "Vesk/vxObject/Graph.h"
-@import "Vesk/vxObject/Path.h"
+@import "Vesk/vxObject/Sources.h"
 
 #include <functional>
 
@@ -32,146 +31,40 @@ struct ModelChange {
   }
 };
 
-// Calls a function with each change while it lives.
+// Calls a function with each change of its thread while it lives. A hook may make others and destroy any.
 class ModelHook {
  public:
   typedef std::function<void(ModelChange const&)> Function;
-  explicit ModelHook(Function function) : m_function(std::move(function)) { Hooks().push_back(this); }
-  ~ModelHook() { Hooks().remove(this); }
+  explicit ModelHook(Function function) : m_function(std::move(function)), m_hooks(Hooks::Get()) {
+    m_hooks.m_list.push_back(this);
+    m_hooks.Use();
+  }
+  ~ModelHook() {
+    m_hooks.m_list.remove(this);
+    m_hooks.Release();
+  }
   ModelHook(ModelHook const&) = delete;
   void operator=(ModelHook const&) = delete;
 
   static void Notify(ModelChange const& change) {
-    for (ModelHook* hook : std::list<ModelHook*>(Hooks())) hook->m_function(change);
+    std::list<ModelHook*> const& hooks = Hooks::Get().m_list;
+    for (ModelHook* hook : std::list<ModelHook*>(hooks)) {
+      if (std::find(hooks.begin(), hooks.end(), hook) == hooks.end()) continue;
+      const Function function = hook->m_function;
+      function(change);
+    }
   }
-  static bool Any() { return !Hooks().empty(); }
+  static bool Any() {
+    Hooks const* hooks = Hooks::Peek();
+    return hooks && !hooks->m_list.empty();
+  }
 
  private:
-  static std::list<ModelHook*>& Hooks() {
-    static std::list<ModelHook*> hooks;
-    return hooks;
-  }
+  struct Hooks : PerThread<Hooks> {
+    std::list<ModelHook*> m_list;
+  };
   Function m_function;
-};
-
-// --- Sources: the fields that calculations have read. A source lives as long as someone depends on it.
-
-class DataSource : public DGIndepNode {
- public:
-  xstring Name() const override { return m_name; }
-
-  // A calculation read the memory [begin, begin + size).
-  static void OnRead(void const* begin, std::size_t size, ConstStringZ name) {
-    if (!Calculating()) return;
-    octet_t const* address = static_cast<octet_t const*>(begin);
-    for (auto [at, end] = ByAddress().equal_range(address); at != end; ++at) {
-      if (at->second->m_size == size) return at->second->Link();
-    }
-    MostBytes() = std::max(MostBytes(), size);
-    (new DataSource(address, size, name))->Link();
-  }
-
-  // That memory changes. An element in memory of its own (of a map, of a dynamic array) and its container are told
-  // apart from other fields by the name, up to the first index.
-  static void OnWrite(void const* begin, std::size_t size, ConstStringZ name) {
-    if (ByAddress().empty()) return;
-    octet_t const* address = static_cast<octet_t const*>(begin);
-    xvector<DGNode const*> readers;
-    auto at = ByAddress().lower_bound(address - MostBytes());
-    for (; at != ByAddress().end() && at->first < address + size; ++at) {
-      DataSource const& source = *at->second;
-      if (source.m_address + source.m_size > address) source.AddDependents(readers);
-    }
-    if (name) {
-      for (auto [near, end] = ByField().equal_range(FieldOf(name)); near != end; ++near) {
-        if (near->second->m_name != name) near->second->AddDependents(readers);
-      }
-    }
-    for (DGNode const* reader : readers) Dirty(reader);
-  }
-
- private:
-  typedef std::multimap<octet_t const*, DataSource*> AddressMap;
-  typedef std::multimap<std::string_view, DataSource*> FieldMap;
-
-  DataSource(octet_t const* address, std::size_t size, ConstStringZ name)
-      : m_address(address),
-        m_size(size),
-        m_name(name),
-        m_byAddress(ByAddress().insert({address, this})),
-        m_byField(ByField().insert({FieldOf(m_name), this})) {}
-  ~DataSource() override {
-    ByAddress().erase(m_byAddress);
-    ByField().erase(m_byField);
-  }
-  void OnNoDependents() const override { delete this; }
-  void AddDependents(xvector<DGNode const*>& readers) const {
-    readers.insert(readers.end(), Dependents().begin(), Dependents().end());
-  }
-  static std::string_view FieldOf(std::string_view name) { return name.substr(0, name.find('[')); }
-  static AddressMap& ByAddress() {
-    static AddressMap* const map = new AddressMap;
-    return *map;
-  }
-  static FieldMap& ByField() {
-    static FieldMap* const map = new FieldMap;
-    return *map;
-  }
-  static std::size_t& MostBytes() {
-    static std::size_t most = 0;
-    return most;
-  }
-
-  octet_t const* m_address;
-  std::size_t m_size;
-  std::string m_name;
-  AddressMap::iterator m_byAddress;
-  FieldMap::iterator m_byField;
-};
-
-// The same for models with operations, whose fields are known by object and path.
-class PathSource : public DGIndepNode {
- public:
-  xstring Name() const override { return "model field"; }
-
-  static void OnRead(void const* object, Path const& path) {
-    if (!Calculating()) return;
-    for (PathSource* source : ByObject()[object]) {
-      if (source->m_path == path) return source->Link();
-    }
-    (new PathSource(object, path))->Link();
-  }
-
-  static void OnWrite(void const* object, Path const& path) {
-    const auto at = ByObject().find(object);
-    if (at == ByObject().end()) return;
-    xvector<DGNode const*> readers;
-    for (PathSource* source : at->second) {
-      if (!source->m_path.Holds(path) && !path.Holds(source->m_path)) continue;
-      readers.insert(readers.end(), source->Dependents().begin(), source->Dependents().end());
-    }
-    for (DGNode const* reader : readers) Dirty(reader);
-  }
-
- private:
-  typedef std::map<void const*, std::list<PathSource*>> ObjectMap;
-
-  PathSource(void const* object, Path const& path) : m_object(object), m_path(path) {
-    ByObject()[object].push_back(this);
-  }
-  ~PathSource() override {
-    const auto at = ByObject().find(m_object);
-    at->second.remove(this);
-    if (at->second.empty()) ByObject().erase(at);
-  }
-  void OnNoDependents() const override { delete this; }
-  static ObjectMap& ByObject() {
-    static ObjectMap* const map = new ObjectMap;
-    return *map;
-  }
-
-  void const* m_object;
-  Path m_path;
+  Hooks& m_hooks;
 };
 
 // --- Barriers
@@ -191,26 +84,26 @@ void NotifyHooks(ModelChange::EKind kind, T* object, Path const& path, ConstStri
 }
 
 template <typename E, typename T>
-void DataSourceReadBarrier(E const* field, T const*, ConstStringZ name) {
-  DataSource::OnRead(field, sizeof(E), name);
+void DataSourceReadBarrier(E const* field, T const* object, ConstStringZ name) {
+  DataSource::OnRead(field, sizeof(E), object, name);
 }
 template <typename E>
 void DataSourceReadBarrier(E const* field, NullInterface, ConstStringZ name) {
-  DataSource::OnRead(field, sizeof(E), name);
+  DataSource::OnRead(field, sizeof(E), nullptr, name);
 }
 template <typename E, typename T>
 void DataSourceWriteBarrier(E* field, T* object, ConstStringZ name) {
   NotifyHooks(ModelChange::Write, object, Path(), name);
-  DataSource::OnWrite(field, sizeof(E), name);
+  DataSource::OnWrite(field, sizeof(E), object, name);
 }
 template <typename E>
 void DataSourceWriteBarrier(E* field, NullInterface, ConstStringZ name) {
   if (ModelHook::Any()) ModelHook::Notify({ModelChange::Write, nullptr, nullptr, Path(), name});
-  DataSource::OnWrite(field, sizeof(E), name);
+  DataSource::OnWrite(field, sizeof(E), nullptr, name);
 }
 template <typename E>
 void DataSourceEvict(E const* field) {
-  DataSource::OnWrite(field, sizeof(E), nullptr);
+  DataSource::OnWrite(field, sizeof(E), nullptr, nullptr);
 }
 
 template <typename T>
@@ -330,11 +223,18 @@ inline RSN ReleaseBeingRead(XTarget const& target) {
 }  // namespace vesk
 
 // In one source of each project: X is the project's folder with `_` for each `/`, RELEASE the release number that its
-// models write. Archives of classes begin with it; models are read as of the release that their archive names.
-#define vxDefineTarget(X, RELEASE)                                                 \
+// models write. Archives of classes begin with it; models are read as of the release that their archive names. The
+// project's Unregister_Project_ function takes its records out of the registry.
+@def vxDefineTarget(X, RELEASE) =
+{
+    vxDefineTargetFunctions(X, RELEASE)
+    $uninit { vxUnregisterTarget(X); }
+}
+#define vxUnregisterTarget(X) ::vesk::UnregisterTarget(::vesk::X##_GetXTarget())
+#define vxDefineTargetFunctions(X, RELEASE)                                        \
   namespace vesk {                                                                 \
   XTarget* X##_GetXTarget() {                                                      \
-    static XTarget target = {#X, RELEASE};                                         \
+    static XTarget target(#X, RELEASE);                                            \
     return &target;                                                                \
   }                                                                                \
   RSN X##_GetModelRsn() { return ReleaseBeingRead(*X##_GetXTarget()); }            \

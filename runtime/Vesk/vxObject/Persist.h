@@ -1,108 +1,236 @@
-// References in archives. A pref or cref is written as the number of its object; at the first one the object follows:
-// the name of its class and what its Serialise writes, so that objects which refer to each other are written once.
+// References in archives. A pref or cref is written as the number of its object. The first mention of an object has the
+// name of its class behind the number; what its Serialise writes follows when the outermost reference is written, for
+// one object after the other, so that objects which refer to each other are written once, however long the chain is.
+// A first mention is told by the number: one more than the next free one. (Archives of before have the next free
+// number, and the content at once, one object within the other; they are read like that.)
+//
 // Objects behind a pref are IPersistable and of a registered class that can be created; a cref may also lead to a plain
-// struct, which is then written as a value.
+// struct, which is then written as a value. Objects that were read belong to the reader's caller. When a reference
+// cannot be read, all that was made for it is destroyed. Errors are ArchiveErrors.
 
 @import "Vesk/vxObject/Mixins.h"
 
 namespace vesk {
 
-// Writes the number of the object. Answers whether the object must follow.
-inline bool WriteObjectNumber(Archive& ar, void const* object) {
+// --- Writing
+
+// Sets a flag while it lives.
+class FlagScope {
+ public:
+  explicit FlagScope(bool& flag) : m_flag(flag) { m_flag = true; }
+  ~FlagScope() { m_flag = false; }
+  FlagScope(FlagScope const&) = delete;
+  void operator=(FlagScope const&) = delete;
+
+ private:
+  bool& m_flag;
+};
+
+inline void WritePersistable(Archive& ar, WrittenObject const& object) {
+  ptr<IPersistable>(object.m_persistable)->Serialise(ar);
+}
+
+// The contents of the objects that were mentioned, unless someone further out is about to write them.
+inline void WriteContents(Archive& ar) {
+  WrittenObjects& objects = ar.m_objects;
+  if (objects.m_isWriting) return;
+  FlagScope scope(objects.m_isWriting);
+  while (objects.m_next < objects.m_list.size()) {
+    const WrittenObject object = objects.m_list[objects.m_next++];
+    object.m_write(ar, object);
+  }
+}
+
+// Writes the number. Answers whether it was the first mention.
+inline bool WriteMention(Archive& ar, WrittenObject const& object, std::type_info const& type) {
   if (ar.m_writesAddresses) {
-    ar.Write(&object, sizeof(object));
+    ar.Write(&object.m_object, sizeof(object.m_object));
     return false;
   }
-  if (!object) {
+  if (!object.m_object) {
     SerialiseVariableLengthUint(ar, 0);
     return false;
   }
-  const auto [at, isNew] = ar.m_objects.insert({object, static_cast<uint32>(ar.m_objects.size() + 1)});
-  SerialiseVariableLengthUint(ar, at->second);
+  const auto [number, isNew] = ar.m_objects.Insert(object, type);
+  SerialiseVariableLengthUint(ar, isNew ? number + 1 : number);
   return isNew;
 }
 
-// Reads a number: 0 for null. An object that has not been read yet gets a place, and the answer is true.
-inline bool ReadObjectNumber(InputArchive& ar, std::size_t& number) {
-  DeserialiseVariableLengthUint(ar, number);
-  if (number <= ar.m_objects.size()) return false;
-  if (number != ar.m_objects.size() + 1) throw ArchiveError("reference to an object that is not in the archive");
-  if (number > ar.m_limits.m_objects) throw ArchiveError("too many objects in an archive");
-  ar.m_objects.push_back({nullptr, AnyInterface(), nullptr});
-  return true;
-}
-
-// What tells the class of an object in an archive from others: its record, else the address of something of its own.
-template <typename C>
-void const* ArchivedType() {
-  static const char mark = 0;
-  void const* record = RecordOf<std::remove_const_t<C>>();
-  return record ? record : &mark;
-}
-
-inline void WritePersistable(Archive& ar, ptr<IPersistable> const& object) {
-  ReflectedClass const* record = object ? object->GetReflectedClass() : nullptr;
-  if (!record) throw ArchiveError("object is not persistable");
-  ar << xstring(record->m_name);
-  object->Serialise(ar);
-}
-
-// Makes an object of the class that the archive names, and reads it.
-inline ptr<IPersistable> ReadPersistable(InputArchive& ar, InputArchive::ReadObject* place) {
-  xstring name;
-  ar >> name;
-  ReflectedClass const* record = Find<ReflectedClass>(name);
-  if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
-  const ptr<IPersistable> object = QueryInterface<IPersistable>(record->m_create());
-  if (!object) throw ArchiveError("not persistable: " + name);
-  if (place) *place = {object.Object(), object.Any(), record};
-  object->Deserialise(ar);
-  return object;
+template <typename I>
+void WriteObjectMention(Archive& ar, ptr<I> const& object) {
+  ptr<IPersistable> persistable;
+  if (object && !ar.m_writesAddresses) {
+    persistable = QueryInterface<IPersistable>(object);
+    if (!persistable || !persistable->GetReflectedClass()) throw ArchiveError("object is not persistable");
+  }
+  if (!WriteMention(ar, {object.Object(), persistable.Any(), WritePersistable}, typeid(void))) return;
+  ar << xstring(persistable->GetReflectedClass()->m_name);
+  WriteContents(ar);
 }
 
 template <typename I>
 void Serialise(Archive& ar, pref<I> const& reference) {
-  if (WriteObjectNumber(ar, reference.Object())) WritePersistable(ar, QueryInterface<IPersistable>(reference.Get()));
+  WriteObjectMention(ar, reference.Get());
 }
 
-template <typename I>
-void Deserialise(InputArchive& ar, pref<I>& reference) {
-  std::size_t number;
-  if (ReadObjectNumber(ar, number)) ReadPersistable(ar, &ar.m_objects[number - 1]);
-  reference = pref<I>();
-  if (number == 0) return;
-  reference = QueryInterface<I>(ptr<IPersistable>(ar.m_objects[number - 1].m_persistable));
-  if (!reference) throw ArchiveError("reference to an object without the interface");
+template <typename C>
+void WriteStruct(Archive& ar, WrittenObject const& object) {
+  SerialiseArray(ar, static_cast<C const*>(object.m_object), 0, 1);
 }
 
 template <typename C>
 void Serialise(Archive& ar, cref<C> const& reference) {
-  if (!WriteObjectNumber(ar, reference.Object())) return;
   if constexpr (IsObjectClass<C>) {
-    WritePersistable(ar, QueryInterface<IPersistable>(ptr<IObject>(reference.Get())));
-  } else {
-    SerialiseArray(ar, reference.Get(), 0, 1);
+    WriteObjectMention(ar, ptr<IObject>(reference.Get()));
+  } else if (WriteMention(ar, {reference.Get(), AnyInterface(), WriteStruct<C>}, typeid(C))) {
+    WriteContents(ar);
   }
+}
+
+// --- Reading
+
+enum class EMention { Null, Known, New, NewWithContent };
+
+inline EMention ReadMention(InputArchive& ar, std::size_t& number) {
+  DeserialiseVariableLengthUint(ar, number);
+  const std::size_t known = ar.m_objects.m_list.size();
+  if (number == 0) return EMention::Null;
+  if (number <= known) return EMention::Known;
+  if (number > known + 2) throw ArchiveError("reference to an object that is not in the archive");
+  if (known >= ar.m_limits.m_objects) throw ArchiveError("too many objects in an archive");
+  const bool hasContent = number == known + 1;
+  number = known + 1;
+  return hasContent ? EMention::NewWithContent : EMention::New;
+}
+
+// Where contents stand within each other the stack grows with them.
+constexpr std::size_t LeastStackForContent = 128 * 1024;
+
+inline void ReadContent(InputArchive& ar, std::size_t position) {
+  if (ar.m_objects.m_list[position].m_isRead) return;
+  if (StackLeft() < LeastStackForContent) throw ArchiveError("objects nested too deeply in an archive");
+  ar.m_objects.m_list[position].m_isRead = true;
+  const ReadObject object = ar.m_objects.m_list[position];
+  object.m_read(ar, object);
+}
+
+// Reads a number and what must follow it. Make: ReadObject(), of an object that the archive begins. Answers its
+// position, -1 for null.
+template <typename Make>
+ssize_t ReadReference(InputArchive& ar, Make make) {
+  ReadObjects& objects = ar.m_objects;
+  std::size_t number;
+  const EMention mention = ReadMention(ar, number);
+  const ssize_t position = static_cast<ssize_t>(number) - 1;
+  if (mention == EMention::Null || mention == EMention::Known) return position;
+  auto read = [&] {
+    objects.m_list.push_back(make());
+    if (mention == EMention::NewWithContent) ReadContent(ar, position);
+  };
+  if (objects.m_isReading) {
+    read();
+    return position;
+  }
+  FlagScope scope(objects.m_isReading);
+  try {
+    read();
+    while (objects.m_next < objects.m_list.size()) ReadContent(ar, objects.m_next++);
+  } catch (...) {
+    objects.Destroy(position);
+    objects.m_next = position;
+    throw;
+  }
+  return position;
+}
+
+inline bool ListsInterface(ReflectedClass const& record, ConstStringZ name) {
+  ConstStringZ const* end = record.m_interfaces + record.m_numBaseInterfaces + record.m_numInterfaces;
+  return std::any_of(record.m_interfaces, end, [name](ConstStringZ other) { return std::strcmp(name, other) == 0; });
+}
+
+// Makes an object of the class that the archive names. `fits`: whether a class is what the reference asks for.
+template <typename Fits>
+ReadObject MakePersistable(InputArchive& ar, Fits fits) {
+  xstring name;
+  ar >> name;
+  ReflectedClass const* record = Find<ReflectedClass>(name);
+  if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
+  if (!fits(*record) || !ListsInterface(*record, GetReflectedInterface<IPersistable>().m_name)) {
+    throw ArchiveError("not the class of the reference: " + name);
+  }
+  if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
+  const ptr<IPersistable> made = QueryInterface<IPersistable>(record->m_create());
+  if (!made) throw ArchiveError("not persistable: " + name);
+  ReadObject object;
+  object.m_self = made.Object();
+  object.m_persistable = made.Any();
+  object.m_type = &typeid(void);
+  object.m_read = [](InputArchive& input, ReadObject const& o) {
+    ptr<IPersistable>(o.m_persistable)->Deserialise(input);
+  };
+  object.m_forget = [](ReadObject const& o) {
+    ReferenceCleaner cleaner;
+    ptr<IPersistable>(o.m_persistable)->VisitPrefs(cleaner);
+  };
+  object.m_destroy = [](ReadObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
+  return object;
+}
+
+template <typename C>
+ReadObject MakeStruct() {
+  ReadObject object;
+  object.m_self = new C();
+  object.m_type = &typeid(C);
+  object.m_read = [](InputArchive& input, ReadObject const& o) {
+    DeserialiseArray(input, static_cast<C*>(o.m_self), 0, 1);
+  };
+  object.m_forget = [](ReadObject const& o) {
+    ReferenceCleaner cleaner;
+    static_cast<IPrefVisitor&>(cleaner) << *static_cast<C const*>(o.m_self);
+  };
+  object.m_destroy = [](ReadObject const& o) { delete static_cast<C*>(o.m_self); };
+  return object;
+}
+
+template <typename I>
+void Deserialise(InputArchive& ar, pref<I>& reference) {
+  typedef std::remove_const_t<I> Interface;
+  reference = pref<I>();
+  const ssize_t position = ReadReference(ar, [&ar] {
+    return MakePersistable(ar, [](ReflectedClass const& record) {
+      return ListsInterface(record, GetReflectedInterface<Interface>().m_name);
+    });
+  });
+  if (position < 0) return;
+  const ptr<IPersistable> object(ar.m_objects.m_list[position].m_persistable);
+  const ptr<I> found = QueryInterface<I>(object);
+  if (!found) throw ArchiveError("reference to an object of another class");
+  reference = found;
 }
 
 template <typename C>
 void Deserialise(InputArchive& ar, cref<C>& reference) {
-  std::size_t number;
-  if (ReadObjectNumber(ar, number)) {
-    if constexpr (IsObjectClass<C>) {
-      ReadPersistable(ar, &ar.m_objects[number - 1]);
-    } else {
-      C* object = new C();
-      ar.m_objects[number - 1] = {object, AnyInterface(), ArchivedType<C>()};
-      DeserialiseArray(ar, object, 0, 1);
-    }
-  }
   reference = cref<C>();
-  if (number == 0) return;
-  InputArchive::ReadObject const& object = ar.m_objects[number - 1];
-  if (object.m_type != ArchivedType<C>()) throw ArchiveError("reference to an object of another class");
-  reference = static_cast<C*>(object.m_self);
+  ssize_t position;
+  bool fits = true;
+  if constexpr (IsObjectClass<C>) {
+    // The record of the class, not of what it derives from or what derives from it.
+    auto isClass = [](ReflectedClass const& record) { return record.m_name == xstring(GetReflectedClass<C>().m_name); };
+    position = ReadReference(ar, [&] { return MakePersistable(ar, isClass); });
+    if (position >= 0) {
+      const ptr<IPersistable> object(ar.m_objects.m_list[position].m_persistable);
+      ReflectedClass const* record = object ? object->GetReflectedClass() : nullptr;
+      fits = record && isClass(*record);
+    }
+  } else {
+    position = ReadReference(ar, MakeStruct<C>);
+    if (position >= 0) fits = *ar.m_objects.m_list[position].m_type == typeid(C);
+  }
+  if (!fits) throw ArchiveError("reference to an object of another class");
+  if (position >= 0) reference = static_cast<C*>(ar.m_objects.m_list[position].m_self);
 }
+
+// --- Whole objects
 
 // Stands ahead of a whole object; the last byte is the version of the form. No reference begins so, hence what was
 // written without it can be read as well.
@@ -115,7 +243,7 @@ inline void ReadObjectMark(InputArchive& ar) {
   if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
 }
 
-// A whole object: its class and its content.
+// An object with all that it refers to: classes and contents.
 template <typename I>
 xvector<octet_t> WriteObject(ptr<I> const& object) {
   Archive ar;
@@ -124,10 +252,14 @@ xvector<octet_t> WriteObject(ptr<I> const& object) {
   return ar.m_bytes;
 }
 
+// What WriteObject wrote. The objects belong to the caller; the archive is refused (ArchiveError) where the first is no
+// I. `allow` is asked before an object of a class is made.
 template <typename I>
-ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits()) {
+ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits(),
+                  std::function<bool(ReflectedClass const&)> allow = nullptr) {
   InputArchive ar(std::move(bytes), limits);
   ReadObjectMark(ar);
+  ar.m_objects.m_allow = std::move(allow);
   pref<I> reference;
   ar >> reference;
   return reference.Get();

@@ -11,11 +11,17 @@
 #include <utility>
 #include <sys/types.h>
 
-// Records list the offsets of fields of classes with bases. Every supported compiler lays these out as expected.
+// The version of this library: major * 10000 + minor * 100 + patch.
+#define VESK_VERSION 10100
+
+// Records list the offsets of fields of classes with bases, and functors are ordered by their functions. Every supported
+// compiler does with these what is expected. The text that is warned of stands in the sources of the user, so what keeps
+// the warnings away reaches all that follows; who wants them defines VESK_KEEP_WARNINGS.
+#ifndef VESK_KEEP_WARNINGS
 #pragma GCC diagnostic ignored "-Winvalid-offsetof"
-// Functors are ordered by their functions.
 #ifdef __clang__
 #pragma clang diagnostic ignored "-Wordered-compare-function-pointers"
+#endif
 #endif
 
 #if !defined(_WIN32) && !defined(__stdcall)
@@ -58,7 +64,11 @@ constexpr NullInterface null = {};
 
 }  // namespace vesk
 
-// Generated text spells scalar types without a name space in some places, and so may the signatures of `$` members.
+// Generated text spells scalar types without a name space in some places, and so may the signatures of `$` members. A
+// header that has names like these in the global name space can stand beside it: an ambiguous name must then be qualified
+// where it is used.
+namespace vesk {
+namespace scalars {
 using vesk::char16;
 using vesk::char8;
 using vesk::float32;
@@ -73,6 +83,42 @@ using vesk::uint16;
 using vesk::uint32;
 using vesk::uint64;
 using vesk::uint8;
+}  // namespace scalars
+}  // namespace vesk
+using namespace vesk::scalars;
+
+#if defined(_LIBCPP_VERSION) && !defined(_LIBCPP_ENABLE_CXX17_REMOVED_AUTO_PTR)
+// What [copy] parameters arrive in. This library has taken it out.
+namespace std {
+template <typename T>
+class auto_ptr {
+ public:
+  typedef T element_type;
+  explicit auto_ptr(T* object = nullptr) noexcept : m_object(object) {}
+  auto_ptr(auto_ptr& rhs) noexcept : m_object(rhs.release()) {}
+  auto_ptr(auto_ptr&& rhs) noexcept : m_object(rhs.release()) {}
+  ~auto_ptr() { delete m_object; }
+  auto_ptr& operator=(auto_ptr& rhs) noexcept {
+    reset(rhs.release());
+    return *this;
+  }
+  auto_ptr& operator=(auto_ptr&& rhs) noexcept {
+    reset(rhs.release());
+    return *this;
+  }
+  T& operator*() const noexcept { return *m_object; }
+  T* operator->() const noexcept { return m_object; }
+  T* get() const noexcept { return m_object; }
+  T* release() noexcept { return exchange(m_object, nullptr); }
+  void reset(T* object = nullptr) noexcept {
+    if (object != m_object) delete exchange(m_object, object);
+  }
+
+ private:
+  T* m_object;
+};
+}  // namespace std
+#endif
 
 #ifdef NDEBUG
 #define vxAssert(x) ((void)0)

@@ -180,7 +180,27 @@ struct ReflectedAttribute {
   octet_t const* m_type;
 };
 
+struct ReflectedInterface;
+
+// The address of an interface's record, as `&record` gives it. It is a pointer, except that it equals that of a copy: of
+// a record of the same name and layout in another module of the process (Registry.h compares them).
+class InterfaceRecord {
+ public:
+  InterfaceRecord(ReflectedInterface const* record) : m_record(record) {}
+  operator ReflectedInterface const*() const { return m_record; }
+  ReflectedInterface const& operator*() const { return *m_record; }
+  ReflectedInterface const* operator->() const { return m_record; }
+  friend bool operator==(InterfaceRecord a, InterfaceRecord b);
+  friend bool operator!=(InterfaceRecord a, InterfaceRecord b) { return !(a == b); }
+  friend bool operator==(InterfaceRecord a, ReflectedInterface const* b) { return a == InterfaceRecord(b); }
+  friend bool operator!=(InterfaceRecord a, ReflectedInterface const* b) { return !(a == InterfaceRecord(b)); }
+
+ private:
+  ReflectedInterface const* m_record;
+};
+
 struct ReflectedInterface {
+  InterfaceRecord operator&() const { return std::addressof(*this); }
   ConstStringZ m_name;
   octet_t const* m_metadata;
   ConstStringZ const* m_bases;

@@ -1,13 +1,18 @@
 // What is registered: records by qualified name, TypeOps by type. A project's Register_Project_ function fills the
 // registry at start-up. Everything here can be listed, in the order of the names.
 
-@import "Vesk/vxObject/ByteCode.h"
+@import "Vesk/vxObject/Layout.h"
 @import "Vesk/vxObject/TypeOps.h"
 
 namespace vesk {
 
-// A project at run time: vxDefineTarget (Model.h) makes it.
+// A project at run time: vxDefineTarget (Model.h) makes it. Where its module is unloaded, what it registered goes with it.
 struct XTarget {
+  XTarget(ConstStringZ name, RSN rsn) : m_name(name), m_rsn(rsn) {}
+  ~XTarget();
+  XTarget(XTarget const&) = delete;
+  void operator=(XTarget const&) = delete;
+
   ConstStringZ m_name;
   RSN m_rsn;  // the release that it writes
 };
@@ -20,17 +25,23 @@ struct RegisteredRecord {
   XTarget* m_target;
 };
 
+// By name: the record in use in front, behind it the copies of it that other modules of the process have.
 template <typename R>
-std::map<std::string, RegisteredRecord<R>>& RecordTable() {
-  static std::map<std::string, RegisteredRecord<R>> table;
-  return table;
+std::map<std::string, std::vector<RegisteredRecord<R>>>& RecordTable() {
+  static auto* const table = new std::map<std::string, std::vector<RegisteredRecord<R>>>;  // outlives static objects
+  return *table;
 }
 
-// The same record may be registered again; another one of its name is refused.
+// The same record may be registered again, and so may a copy of it; another one of its name is refused.
 template <typename R>
 NSE RegisterRecord(R const* record, XTarget* target) {
-  const auto [at, isNew] = RecordTable<R>().insert({record->m_name, {record, target}});
-  return isNew || at->second.m_record == record ? NSE_OK : NSE_ALREADY_DEFINED;
+  std::vector<RegisteredRecord<R>>& records = RecordTable<R>()[record->m_name];
+  for (RegisteredRecord<R> const& registered : records) {
+    if (registered.m_record == record) return NSE_OK;
+  }
+  if (!records.empty() && LayoutText(*records.front().m_record) != LayoutText(*record)) return NSE_ALREADY_DEFINED;
+  records.push_back({record, target});
+  return NSE_OK;
 }
 
 inline NSE RegisterReflectedClass(ReflectedClass const* r, XTarget* t) { return RegisterRecord(r, t); }
@@ -50,33 +61,33 @@ inline NSE RegisterReflectedTypedef(ReflectedTypedef const* r, XTarget* t) { ret
 template <typename R>
 R const* Find(std::string const& name) {
   const auto at = RecordTable<R>().find(name);
-  return at == RecordTable<R>().end() ? nullptr : at->second.m_record;
+  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_record;
 }
 
 template <typename R>
 xvector<R const*> All() {
   xvector<R const*> records;
-  for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.m_record);
+  for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.front().m_record);
   return records;
 }
 
 template <typename R>
 XTarget* TargetOf(R const& record) {
   const auto at = RecordTable<R>().find(record.m_name);
-  return at == RecordTable<R>().end() ? nullptr : at->second.m_target;
+  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_target;
 }
 
 // --- Types
 
 inline std::map<xstring, TypeOps const*>& TypeOpsTable() {
-  static std::map<xstring, TypeOps const*> table = {
+  static auto* const table = new std::map<xstring, TypeOps const*>{
       {"bool", &MakeTypeOps<bool>()},       {"int8", &MakeTypeOps<int8>()},        {"int16", &MakeTypeOps<int16>()},
       {"int32", &MakeTypeOps<int32>()},     {"int64", &MakeTypeOps<int64>()},      {"int128", &MakeTypeOps<int128>()},
       {"uint8", &MakeTypeOps<uint8>()},     {"uint16", &MakeTypeOps<uint16>()},    {"uint32", &MakeTypeOps<uint32>()},
       {"uint64", &MakeTypeOps<uint64>()},   {"uint128", &MakeTypeOps<uint128>()},  {"float32", &MakeTypeOps<float32>()},
       {"float64", &MakeTypeOps<float64>()}, {"char8", &MakeTypeOps<char8>()},      {"char16", &MakeTypeOps<char16>()},
       {"string8", &MakeTypeOps<string8>()}, {"string16", &MakeTypeOps<string16>()}};
-  return table;
+  return *table;
 }
 
 // The first table of a type stays.
@@ -121,6 +132,41 @@ inline void PrintValue(xostream& os, ReflectedType const& type, void const* valu
     ops->m_print(os, value);
   } else {
     os << '?';
+  }
+}
+
+// --- Unloading
+
+template <typename R>
+void UnregisterRecords(XTarget const* target) {
+  auto& table = RecordTable<R>();
+  for (auto at = table.begin(); at != table.end();) {
+    std::vector<RegisteredRecord<R>>& records = at->second;
+    records.erase(std::remove_if(records.begin(), records.end(),
+                                 [=](RegisteredRecord<R> const& record) { return record.m_target == target; }),
+                  records.end());
+    at = records.empty() ? table.erase(at) : std::next(at);
+  }
+}
+
+// Takes all records of a project out of the registry. What uses one of them must be gone.
+inline void UnregisterTarget(XTarget const* target) {
+  UnregisterRecords<ReflectedClass>(target);
+  UnregisterRecords<ReflectedInterface>(target);
+  UnregisterRecords<ReflectedEnum>(target);
+  UnregisterRecords<ReflectedVariant>(target);
+  UnregisterRecords<ReflectedFunctor>(target);
+  UnregisterRecords<ReflectedGlobalFunction>(target);
+  UnregisterRecords<ReflectedGlobalVariable>(target);
+  UnregisterRecords<ReflectedTypedef>(target);
+}
+
+inline XTarget::~XTarget() {
+  if (IsProcessEnding(this)) return;
+  UnregisterTarget(this);
+  auto& table = TypeOpsTable();
+  for (auto at = table.begin(); at != table.end();) {
+    at = ModuleOf(at->second) == ModuleOf(this) ? table.erase(at) : std::next(at);
   }
 }
 

@@ -3,7 +3,9 @@
 
 @import "Vesk/vxObject/Platform.h"
 
-#include <sstream>
+#include <algorithm>
+#include <charconv>
+#include <iostream>
 #include <string>
 #include <string_view>
 
@@ -22,29 +24,73 @@ typedef basic_xstring<char8> string8;
 typedef basic_xstring<char16> string16;
 typedef string8 xstring;
 
+// Writes to a std::ostream, or without one into memory.
 class xostream {
  public:
-  explicit xostream(std::ostream& target) : m_target(target) {}
+  explicit xostream(std::ostream& target) : m_target(&target) {}
+  xostream() : m_target(nullptr) {}
+  xostream(xostream const&) = delete;
+  void operator=(xostream const&) = delete;
 
   void Write(std::string_view text) {
+    if (text.empty()) return;
+    if (m_indent == 0) {
+      Append(text);
+      m_atLineStart = text.back() == '\n';
+      return;
+    }
     while (!text.empty()) {
       const std::size_t end = text.find('\n');
       const std::string_view line = text.substr(0, end);
-      if (m_atLineStart && !line.empty()) m_target << std::string(m_indent, ' ');
-      m_target << line;
+      if (m_atLineStart && !line.empty()) Append(std::string(m_indent, ' '));
+      Append(line);
       m_atLineStart = m_atLineStart && line.empty();
       if (end == std::string_view::npos) return;
-      m_target << '\n';
+      Append("\n");
       m_atLineStart = true;
       text.remove_prefix(end + 1);
     }
   }
 
+  // In the shortest form that reads back as the same number, whatever the locale.
+  template <typename T>
+  void WriteNumber(T value) {
+    if (m_target || m_indent != 0) {
+      char text[MostDigits];
+      Write(std::string_view(text, std::to_chars(text, text + MostDigits, value).ptr - text));
+      return;
+    }
+    if (m_text.size() - m_size < MostDigits) Grow(MostDigits);
+    char* at = &m_text[m_size];
+    m_size += std::to_chars(at, at + MostDigits, value).ptr - at;
+    m_atLineStart = false;
+  }
+
   void ChangeIndent(int by) { m_indent += by; }
-  std::ostream& Target() { return m_target; }
+
+  // What was written into memory; it begins anew.
+  xstring TakeText() {
+    m_text.resize(std::exchange(m_size, 0));
+    return std::exchange(m_text, std::string());
+  }
 
  private:
-  std::ostream& m_target;
+  enum { MostDigits = 64 };
+
+  void Append(std::string_view text) {
+    if (m_target) {
+      m_target->write(text.data(), static_cast<std::streamsize>(text.size()));
+      return;
+    }
+    if (m_text.size() - m_size < text.size()) Grow(text.size());
+    std::copy(text.begin(), text.end(), &m_text[m_size]);
+    m_size += text.size();
+  }
+  void Grow(std::size_t by) { m_text.resize(std::max(2 * m_text.size(), m_size + by + 64)); }
+
+  std::ostream* m_target;
+  std::string m_text;  // with room behind what was written
+  std::size_t m_size = 0;
   int m_indent = 0;
   bool m_atLineStart = true;
 };
@@ -69,8 +115,8 @@ class ScopeWriter2 {
 
 // The standard output.
 inline xostream& xout() {
-  static xostream os(std::cout);
-  return os;
+  static xostream* const os = new xostream(std::cout);  // outlives every static object
+  return *os;
 }
 
 inline void AppendUtf8(std::string& text, uint32 c) {
@@ -118,9 +164,7 @@ xostream& operator<<(xostream& os, T value) {
     os.Write((isNegative ? "-" : "") +
              DecimalText(isNegative ? -static_cast<uint128>(value) : static_cast<uint128>(value)));
   } else {
-    std::ostringstream text;
-    text << +value;
-    os.Write(text.str());
+    os.WriteNumber(+value);
   }
   return os;
 }
@@ -148,15 +192,15 @@ inline xostream& operator<<(xostream& os, string16 const& text) {
 
 template <typename T>
 xostream& operator<<(xostream& os, T* address) {
-  std::ostringstream text;
-  if constexpr (std::is_function<T>::value) {
-    text << reinterpret_cast<void*>(address);
-  } else {
-    text << static_cast<void const*>(address);
-  }
-  os.Write(text.str());
+  char text[2 + 2 * sizeof(address)] = {'0', 'x'};
+  const std::uintptr_t number = reinterpret_cast<std::uintptr_t>(address);
+  char* end = number ? std::to_chars(text + 2, text + sizeof(text), number, 16).ptr : text + 1;
+  os.Write(std::string_view(text, end - text));
   return os;
 }
+
+// Without this one, an array of characters would be an address.
+inline xostream& operator<<(xostream& os, char* text) { return os << static_cast<ConstStringZ>(text); }
 
 template <typename A, typename B>
 xostream& operator<<(xostream& os, std::pair<A, B> const& pair) {
@@ -171,10 +215,9 @@ auto operator<<(xostream& os, T const& field) -> decltype(os << std::declval<Val
 
 template <typename Print>
 xstring TextOf(Print print) {
-  std::ostringstream text;
-  xostream os(text);
+  xostream os;
   print(os);
-  return text.str();
+  return os.TakeText();
 }
 
 }  // namespace vesk

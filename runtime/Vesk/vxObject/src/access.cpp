@@ -168,7 +168,7 @@ void Value::Change(std::function<void()> const& write) const {
     }
     if (owner->m_record) PathSource::OnWrite(owner->m_object, Path());
   }
-  DataSource::OnWrite(m_address, m_type->m_size, nullptr);
+  DataSource::OnWrite(m_address, m_type->m_size, nullptr, nullptr);
   write();
   for (Owner const* owner = m_owner.get(); owner; owner = owner->m_outer.get()) {
     if (owner->m_writeBack) owner->m_writeBack();

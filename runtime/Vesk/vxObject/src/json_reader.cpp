@@ -243,7 +243,7 @@ class JsonReader {
     if (ModelHook::Any()) {
       ModelHook::Notify({ModelChange::Write, object, &record, Path(), field.m_name.c_str()});
     }
-    DataSource::OnWrite(address, field.m_type->m_size, nullptr);
+    DataSource::OnWrite(address, field.m_type->m_size, nullptr, nullptr);
     Get(*field.m_type, address);
     if (node) node->OnChange();
   }

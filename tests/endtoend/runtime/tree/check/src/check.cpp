@@ -28,6 +28,31 @@ void CheckAccess();
 void CheckGraph();
 void CheckCaches();
 void CheckVisiting();
+void CheckEvictions();
+void CheckWritesInside();
+void CheckErrorsInside();
+void CheckFields();
+void CheckChains();
+void CheckManyLinks();
+void CheckManyWrites();
+void CheckGraphThreads();
+void CheckLinkedObjects();
+void CheckReadClasses();
+void CheckHeap();
+void CheckTexts();
+void CheckCopies();
+
+// Goes when statics of the library might be gone.
+struct Last
+{
+    ~Last()
+    {
+        if (!vesk::Find<vesk::ReflectedInterface>("vesk::IObject") && vesk::All<vesk::ReflectedEnum>().empty())
+        {
+            vesk::xout() << "last\n";
+        }
+    }
+} g_last;
 
 int main()
 {
@@ -36,11 +61,14 @@ int main()
                        CheckReleases, CheckThreads, CheckHostileReferences, CheckHostileTypes, CheckHostileVariants,
                        CheckHostileNumbers, CheckHostileSizes, CheckLimits, CheckRemote, CheckRemoteErrors,
                        CheckRemoteMessages, CheckRemoteAnswers, CheckJsonBothWays, CheckJsonErrors, CheckJsonObjects,
-                       CheckAccess, CheckGraph, CheckCaches, CheckVisiting})
+                       CheckAccess, CheckGraph, CheckCaches, CheckVisiting, CheckEvictions, CheckWritesInside,
+                       CheckErrorsInside, CheckFields, CheckChains, CheckManyLinks, CheckManyWrites, CheckGraphThreads,
+                       CheckLinkedObjects, CheckReadClasses, CheckHeap, CheckTexts, CheckCopies})
     {
         check();
     }
     Unregister_Project_check();
+    CHECK(vesk::Find<vesk::ReflectedClass>("Linked") == nullptr, true);
     std::printf("%d checks, %d failures\n", g_checks, g_failures);
     return g_failures > 0;
 }

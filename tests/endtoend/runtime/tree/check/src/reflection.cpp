@@ -91,6 +91,7 @@ void CheckReflection()
     CHECK(bool(vesk::InterfaceTypeTraits<kinds::ICalc>::is_rmi), true);
     CHECK(vesk::RegisterReflectedClass(&record, nullptr) == vesk::NSE_OK, true);
     vesk::ReflectedClass other = record;
+    other.m_size += 1;
     CHECK(vesk::RegisterReflectedClass(&other, nullptr) == vesk::NSE_ALREADY_DEFINED, true);
 }
 

@@ -1,0 +1,132 @@
+// What a change of an input, an eviction, an error or a write does to what depends on it.
+@import "check.h"
+@import "check/src/nodes.h"
+
+void CheckEvictions()
+{
+    Sums s;
+    s.x = 5;
+    CHECK(s.b.read(), 105);
+    s.a.TryEvict(true);
+    s.x = 0;
+    CHECK(s.b.read(), 100);
+    CHECK(s.ofCaches.read(), 101);
+    s.x = 20;
+    CHECK(s.ofCaches.read(), 123);
+    s.EvictDgsNodes();
+    s.x = 0;
+    CHECK(s.ofCaches.read(), 101);
+    s.x = 30;
+    CHECK(s.ofCaches.read(), 134);
+    s._dn_tens.TryEvict(true);
+    vesk::TryEvict(s._map_plus);
+    s.x = 0;
+    CHECK(s.ofCaches.read(), 101);
+
+    // A dirty value is given back as well, and an assigned object is another one.
+    vesk::EvictionQueue& queue = vesk::EvictionQueue::Get(0);
+    s.b.read();
+    const vesk::ssize_t count = queue.Count();
+    s.x = 1;
+    s.a.TryEvict(true);
+    CHECK(queue.Count(), count - 1);
+    Sums other;
+    other.x = 8;
+    CHECK(s.b.read(), 101);
+    s = other;
+    CHECK(s.b.read(), 108);
+    CHECK(vxMakeString(s.b.Inputs().size() << s.b.Dependents().size() << s.a.Dependents().size()), "101");
+}
+
+void CheckWritesInside()
+{
+    Writes w;
+    w.x = 5;
+    CHECK(w.behind.read(), 50);
+    CHECK(w.counted.IsUpToDate(), true);
+    w.isWriting = true;
+    w.x = 6;
+    CHECK(w.behind.read(), 60);
+    CHECK(w.counted.IsUpToDate() || w.behind.IsUpToDate(), false);
+    CHECK(w.x.read(), 7);
+    CHECK(w.behind.read(), 70);
+    w.isWriting = false;
+    CHECK(w.behind.read(), 80);
+    CHECK(w.counted.IsUpToDate() && w.behind.IsUpToDate(), true);
+
+    w.calculated = 0;
+    CHECK(vxMakeString(w.built.read().first << w.built.read().second), "163");
+    CHECK(w.passing.read(), 108);
+    CHECK(w.built.IsUpToDate() && w.passing.IsUpToDate(), true);
+    CHECK(vxMakeString(w.built.Inputs().size() << w.passing.Inputs().size()), "11");
+    w.built.read();
+    w.passing.read();
+    CHECK(w.calculated, 2);
+}
+
+void CheckErrorsInside()
+{
+    Breaks b;
+    b.x = 3;
+    CHECK(b.careful.read(), 4);
+    b.x = -1;
+    CHECK(vxMakeString(b.careful.read() << b.careless.read()), "-1-1");
+    CHECK(Throws([&] { b.behind.read(); }), true);
+    CHECK(b.behind.IsUpToDate(), false);
+    // What the calculation left behind is no value: coming to it is a change.
+    b.x = 7;
+    CHECK(vxMakeString(b.behind.read() << b.careful.read() << b.careless.read()), "888");
+    b.calculated = 0;
+    b.x = -2;
+    CHECK(b.careful.read(), -1);
+    CHECK(b.calculated, 1);
+}
+
+void CheckFields()
+{
+    Field field, otherField;
+    Plain plain;
+    Around around;
+    Operated operated;
+    Watcher w;
+    w.field = &field;
+    w.plain = &plain;
+    w.around = &around;
+    w.operated = &operated;
+    auto changed = [&w] {
+        return vxMakeString(!w.ofField.IsUpToDate() << !w.ofMap.IsUpToDate() << !w.ofElement.IsUpToDate()
+                                                    << !w.ofAround.IsUpToDate() << !w.ofWords.IsUpToDate());
+    };
+    auto read = [&w] {
+        w.ofField.read();
+        w.ofMap.read();
+        w.ofElement.read();
+        w.ofAround.read();
+        w.ofWords.read();
+    };
+    auto names = [&](auto change) {
+        read();
+        change();
+        const vesk::xstring text = changed();
+        vesk::xstring bits;
+        for (std::size_t i = 0; i < text.size(); ++i)
+        {
+            if (text[i] == 't' || text[i] == 'f') bits += text[i] == 't' ? "1" : text.compare(i, 5, "false") == 0 ? "0" : "";
+        }
+        return bits;
+    };
+    plain.maps[1][2] = 3;
+    operated.words["a"] = 1;
+    CHECK(names([&] { field.a = 1; }), "10000");
+    CHECK(names([&] { otherField.a = 1; otherField.map[1] = 2; }), "00000");
+    CHECK(names([&] { field.map[1] = 2; }), "01000");
+    CHECK(names([&] { field.size.width = 2; }), "00000");
+    // Without an object, elements of the same field are not told apart by what they belong to.
+    CHECK(names([&] { plain.maps[1][2] = 4; }), "00110");
+    CHECK(names([&] { plain.write(); }), "00100");
+    CHECK(names([&] { around.write(); }), "00010");
+    CHECK(names([&] { operated.words["a"] = 2; }), "00001");
+    CHECK(names([&] { operated.words["ab"] = 2; }), "00000");
+    CHECK(names([&] { operated.size.width = 2; }), "00001");
+    CHECK(names([&] { operated.EvictDgsNodes(); }), "00001");
+}

@@ -1,0 +1,151 @@
+// Long chains, many links, many keys: as fast for each as for few, and no deeper on the stack.
+@import "check.h"
+@import "check/src/nodes.h"
+
+#include <ctime>
+#include <thread>
+
+namespace
+{
+
+// Whether an action takes the processor time of a linear one. (What is quadratic takes minutes.)
+template <typename Action>
+bool IsQuick(Action action)
+{
+    const std::clock_t begin = std::clock();
+    action();
+    return std::clock() - begin < 6 * CLOCKS_PER_SEC;
+}
+
+vesk::xvector<Chained> Chain(int length)
+{
+    vesk::xvector<Chained> chain(length);
+    for (int i = 1; i < length; ++i) chain[i].previous = &chain[i - 1];
+    for (Chained& link : chain) link.x = 1;
+    return chain;
+}
+
+}
+
+void CheckChains()
+{
+    const int length = 60000;
+    vesk::xvector<Chained> chain = Chain(length);
+    CHECK(IsQuick([&] { CHECK(chain.back().depth.read(), length); }), true);
+    CHECK(chain[0].calculated + chain[length / 2].calculated < 6, true);
+    chain[0].x = 2;
+    CHECK(chain.back().depth.IsUpToDate(), false);
+    CHECK(IsQuick([&] { CHECK(chain.back().depth.read(), length + 1); }), true);
+    chain.back().depth.TryEvict(true);
+    CHECK(chain.back().depth.read(), length + 1);
+    // A calculation that catches everything catches no unwinding.
+    for (Chained& link : chain) link.depth.TryEvict(true);
+    for (int i = 1; i < length; ++i) chain[i].isCareless = true;
+    CHECK(chain.back().depth.read(), length + 1);
+    // A circle of that length is found.
+    for (Chained& link : chain)
+    {
+        link.depth.TryEvict(true);
+        link.isCareless = false;
+    }
+    chain[0].previous = &chain.back();
+    CHECK(Throws([&] { chain.back().depth.read(); }), true);
+    chain[0].previous = nullptr;
+    CHECK(chain.back().depth.read(), length + 1);
+}
+
+void CheckManyLinks()
+{
+    vesk::xvector<Sums> many(100000);
+    Gathers gathers;
+    gathers.many = &many;
+    gathers.rounds = 2;
+    CHECK(IsQuick([&] {
+        for (Sums& one : many) one.x = 1;
+        CHECK(gathers.total.read(), 200000);
+        CHECK(gathers.total.Inputs().size(), 100001);
+        for (int i = 0; i < 5; ++i)
+        {
+            for (Sums& one : many) one.x = 2;
+        }
+        CHECK(gathers.total.read(), 400000);
+    }), true);
+    vesk::xvector<Scales> all(100000);
+    CHECK(IsQuick([&] {
+        for (Scales& one : all)
+        {
+            one.one = &many[0];
+            one.scaled.read();
+        }
+        for (int i = 0; i < 1000; ++i) many[0].x = 3;
+        CHECK(all.back().scaled.read(), 6);
+        CHECK(many[0].x.Dependents().size(), 1);
+        for (Scales& one : all) one.scaled.TryEvict(true);
+    }), true);
+    CHECK(IsQuick([&] {
+        for (int i = 0; i < 20000; ++i) all[0].later(i);
+        CHECK(vesk::RunAsyncCalculations(), 20000);
+        CHECK(all[0].later(7), 20);
+        for (int i = 0; i < 20000; ++i) all[i].later(i);
+        for (int i = 20000; i-- > 0;) all[i] = Scales();
+    }), true);
+}
+
+void CheckManyWrites()
+{
+    const int count = 20000;
+    Field field;
+    Operated operated;
+    Watcher w;
+    w.field = &field;
+    w.operated = &operated;
+    w.cells = count;
+    field.cells.model().resize(count);
+    CHECK(IsQuick([&] {
+        for (int i = 0; i < count; ++i) operated.map[i] = 1;
+        CHECK(w.ofField.read(), 0);
+        CHECK(w.ofOperated.read(), count);
+        for (int i = 0; i < 3 * count; ++i)
+        {
+            field.cells[i % count] = 1;
+            operated.map[i % count] = 2;
+            field.a = i;
+        }
+        CHECK(w.ofOperated.read(), 2 * count);
+        CHECK(w.ofField.read(), count + 3 * count - 1);
+        for (int i = 0; i < count; ++i) field.a = i;
+    }), true);
+}
+
+// One graph in each thread.
+void CheckGraphThreads()
+{
+    vesk::xvector<int32> results(4);
+    vesk::xvector<std::thread> threads;
+    for (int32& result : results)
+    {
+        threads.emplace_back([&result] {
+            vesk::xvector<Chained> chain = Chain(500);
+            Field field;
+            Watcher w;
+            w.field = &field;
+            vesk::xvector<Scales> all(100);
+            Sums sums;
+            int changes = 0;
+            vesk::ModelHook hook([&changes](vesk::ModelChange const&) { ++changes; });
+            for (int i = 0; i < 100; ++i)
+            {
+                chain[0].x = i;
+                field.a = i;
+                sums.x = i;
+                all[i].one = &sums;
+                result = chain.back().depth + w.ofField + sums.b + all[i].later(i) + int32(vesk::RunAsyncCalculations());
+            }
+            vesk::EvictionQueue::Get(0).EvictDownTo(-1);
+            result += changes + int32(vesk::EvictionQueue::Get(0).Count());
+        });
+    }
+    for (std::thread& thread : threads) thread.join();
+    for (int32 result : results) CHECK(result, results[0]);
+    CHECK(results[0], 499 + 99 + 99 + 199 + 1 + 100);
+}
