@@ -22,8 +22,8 @@ std::string WithCarriageReturns(std::string_view text);
 void AppendWithCarriageReturns(std::string& out, std::string_view text);
 
 // A generated file while it is composed, with CR LF line ends. It replaces the target as a whole when it is committed;
-// without that it leaves no trace. A long text goes to the file beside the target as it comes and is not kept in memory.
-// Writers flush in their destructors, so Write never raises: what it could not write fails Text and Commit.
+// without that it leaves no trace. A long text goes to the file beside the target as it comes and is not kept in
+// memory. Writers flush in their destructors, so Write never raises: what it could not write fails Text and Commit.
 class GeneratedFile : public IOutputStream {
  public:
   explicit GeneratedFile(std::string path) : m_path(std::move(path)) {}

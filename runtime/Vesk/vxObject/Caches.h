@@ -3,7 +3,7 @@
 // and queues the calculation when that is out of date; RunAsyncCalculations carries the queues out and tells who read
 // it.
 
-@import "Vesk/vxObject/Graph.h"
+@import "Vesk/vxObject/CacheValues.h"
 
 namespace vesk {
 

@@ -1,0 +1,185 @@
+#!/usr/bin/env python3
+"""Whole runs with faults: errors in the middle, faults of the disk, runs that are killed.
+
+Usage: faults_test.py BINARY [TEST...]. Each test is a function that works in a folder of its own."""
+
+import os
+import re
+import shutil
+import stat
+import subprocess
+import time
+
+from run_fixture import (BINARY, DEPENDENCIES, TRANSLATED, EACH_RUN, JUNK, write, read, write_tree, run, expect, files_of,
+                         leftovers, contents, changed, edit, dependencies, run_named)
+from workspace_fixture import Skipped, holds, lacks
+
+
+# --- Errors in the middle
+
+def test_nothing_is_lost_when_an_error_ends_the_run():
+    write_tree()
+    run()
+    edit('tree/app/src/x.cpp', '@import "app/b.h"\n@import "app/a.h"\n$init { }\n$init { }\n')
+    edit('tree/app/src/y.cpp', 'int y;\n$bad\n')
+    text = run(status=1)
+    holds(text, "\ntree/app/src/y.cpp(2) : error : '$bad' is not a valid directive")
+    lacks(text, '\napp...')
+    lacks(text, 'Completed')
+    main_before = read(TRANSLATED + 'src/app.cpp')
+    edit('tree/app/src/y.cpp', 'int y;\n')
+    text = run('main.qrex', 'diagnostics=true')
+    expect(re.findall(r'^Writing: .*/(.*)$', text, re.M) == ['y.cpp', 'app.cpp'], text)  # x.cpp was finished before
+    expect(b'_Register_x1' in read(TRANSLATED + 'src/app.cpp') and b'_Register_x1' not in main_before, 'registration')
+
+
+def test_a_failed_translation_keeps_its_imports():
+    # b.h fails ahead of its import of c.h, and c.h changed as well: mending the former must not hide the latter
+    write_tree({'tree/app/b.h': '@import "a.h"\n@import "c.h"\nint b;\n'})
+    run()
+    good = read('tree/app/a.h')
+    good_time = os.stat('tree/app/a.h').st_mtime_ns
+    edit('tree/app/c.h')
+    edit('tree/app/a.h', '$bad\n')
+    run(status=1)
+    write('tree/app/a.h', good)
+    os.utime('tree/app/a.h', ns=(good_time, good_time))
+    text = run('main.qrex', 'diagnostics=true')
+    holds(text, '* b.h\n', '* x.cpp\n', '* y.cpp\n')
+    lacks(run('main.qrex', 'diagnostics=true'), '\n* ')
+
+
+# --- Faults of the disk
+
+def test_what_is_in_the_way():
+    write_tree()
+    write('qrexsource', 'a file')
+    text = run(status=1)
+    holds(text, f'Error: File error ({TRANSLATED}a.h) : The system cannot find the path specified.\n',)
+    os.remove('qrexsource')
+    os.makedirs(TRANSLATED + 'c.h')
+    os.makedirs(TRANSLATED + 'n.txt')
+    holds(run(status=1), f'Error: File error ({TRANSLATED}c.h) : ')
+    os.rmdir(TRANSLATED + 'c.h')
+    holds(run(), f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n'
+                 'ERROR : GetLastError() returned 5 : Access is denied.\n')
+    shutil.rmtree('qrexsource')
+    shutil.rmtree('out')
+    os.makedirs('out/uinc/app/src/app.qrpj')
+    os.makedirs('out/uinc/app/c.h')
+    text = run()
+    holds(text, 'Error: File error (out/uinc/app/src/app.qrpj) : ', '\n...Copy file failed\n', '\nCompleted')
+    shutil.rmtree('out')
+    write('out', 'a file')
+    holds(run(), '\n...Copy file failed\n', '\nCompleted')
+
+
+def test_standard_output_that_takes_nothing():
+    write_tree({'tree/app/c.h': 'int c;\n' * 200000})
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    shutil.rmtree('qrexsource')
+    shutil.rmtree('out')
+    expect(subprocess.run(f'"{BINARY}" main.qrex diagnostics=true >&-', shell=True).returncode == 0, 'closed')
+    expect(without_times(contents('qrexsource', 'out')) == wanted, 'what was printed stands in a file')
+    # a pipe that is full for a while and does not block
+    reading, writing = os.pipe()
+    os.set_blocking(writing, False)
+    os.write(writing, b'.' * 60000)
+    process = subprocess.Popen([BINARY, *['a="' + 'x' * 999 + '"'] * 60, 'main.qrex', 'mode=clean'], stdout=writing)
+    os.close(writing)
+    time.sleep(0.2)
+    with os.fdopen(reading) as pipe:
+        holds(pipe.read(), 'argv[60] = ', '\nCompleted')
+    expect(process.wait() == 0, 'status')
+
+
+def test_what_is_no_plain_file():
+    write_tree()
+    run()
+    for path in ['tree/app/c.h', 'tree/app/n.txt', TRANSLATED + 'src/app.cpp', 'tree/.qrwsroot']:
+        os.remove(path)
+        os.mkfifo(path)
+    holds(run(status=1), "Couldn't open file tree/app/c.h\n")
+    holds(run('main.qrex', 'mode=show', '$COMPILE_FILE_PATH = "tree/app/a.h"', status=1), 'Search for .qrwsroot failed\n')
+    os.remove('tree/app/c.h')
+    write('tree/app/c.h', 'int c;\n')
+    text = run()
+    holds(text, f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n', '\nCompleted')
+    lacks(text, '...Copy file failed')
+    expect(stat.S_ISREG(os.stat(TRANSLATED + 'src/app.cpp').st_mode), 'the output is written anew')
+    holds(subprocess.run([BINARY, '/dev/stdin'], input=read('main.qrex'), stdout=subprocess.PIPE).stdout.decode(),
+          '\nCompleted')  # a configuration may come through a pipe
+
+
+def test_full_disk():
+    write_tree({'tree/app/c.h': 'int c;\n' * 1000})
+    text = run(status=1, limit=4096)
+    holds(text, f'Error: File error ({TRANSLATED}c.h) : ')
+    expect(not os.path.exists(TRANSLATED + 'c.h'), 'half-written')
+    expect(not leftovers(), 'temporaries stay behind')
+    expect(dependencies()[0]['app/b.h'][1] != 0, 'what was finished is kept')
+    run()
+    whole = contents('qrexsource', 'out')
+    edit('tree/app/c.h', 'int c2;\n' * 1000)
+    run(status=1, limit=4096)
+    after = contents('qrexsource', 'out')
+    expect([path for path in whole if after[path] != whole[path]] in ([], [DEPENDENCIES]), 'the old files stay')
+    run()
+    expect(read(TRANSLATED + 'c.h').count(b'c2') == 1000, 'the next run recovers')
+
+
+def test_full_disk_on_a_file_system():
+    os.mkdir('small')
+    mount = subprocess.run(['mount', '-t', 'tmpfs', '-o', 'size=256k', 'tmpfs', 'small'], stderr=subprocess.DEVNULL)
+    if mount.returncode != 0:
+        raise Skipped('mount')
+    try:
+        os.chdir('small')
+        write_tree({'tree/app/c.h': 'int c;\n' * 20000})
+        text = run(status=1)
+        holds(text, f'Error: File error ({TRANSLATED}c.h) : There is not enough space on the disk.\n')
+        expect(not os.path.exists(TRANSLATED + 'c.h') and not leftovers(), 'half-written')
+    finally:
+        os.chdir('..')
+        subprocess.run(['umount', 'small'])
+
+
+# --- Runs that are killed
+
+def without_times(files):
+    return {path: content for path, content in files.items() if path not in EACH_RUN}
+
+
+def test_leftovers_of_killed_runs_are_removed():
+    write_tree()
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    killed = subprocess.Popen(['true'])
+    killed.wait()
+    for path in files_of('qrexsource', 'out') + ['projects.guids']:
+        write(f'{path}.qrex-{killed.pid}.part', JUNK)
+    others = [f'projects.guids.qrex-{os.getpid()}.part', 'projects.guids.part']  # of a run that goes on, of the user
+    for path in others:
+        write(path, JUNK)
+    subprocess.run('find qrexsource out -type f ! -name "*.part" -delete', shell=True)
+    run()
+    expect(without_times(contents('qrexsource', 'out')) == wanted, contents('qrexsource', 'out').keys())
+    expect(sorted(leftovers()) == sorted(others), leftovers())
+
+
+def test_runs_at_the_same_time():
+    write_tree({'tree/app/c.h': 'int c;\n' * 100000})
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    for _ in range(4):
+        shutil.rmtree('qrexsource')
+        shutil.rmtree('out')
+        runs = [subprocess.Popen([BINARY, 'main.qrex'], stdout=subprocess.PIPE, text=True) for _ in range(4)]
+        for process in runs:
+            text = process.communicate()[0]
+            expect(process.returncode == 0 and 'rror' not in text and 'failed' not in text, text)
+        expect(without_times(contents('qrexsource', 'out')) == wanted and not leftovers(), leftovers())
+
+
+run_named(globals())
