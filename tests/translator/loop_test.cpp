@@ -97,8 +97,6 @@ TEST_F(LoopTest, ErrorsOfDirectives) {
       {"\n$bogus x;", 2, "'$bogus' is not a valid directive"},
       {"$schema x;", 1, "'$schema' is not a valid directive"},
       {"int a;\n$", 2, "'$EOS' is not a valid directive"},
-      {"namespace 1 {", 1, "Expected identifier after namespace when read 1"},
-      {"namespace a\n;", 2, "Expected { after a when read ;"},
       {"$enum e { x };\nnamespace e { }", 2, "Can't open namespace e : $enum e is not a namespace"},
       {"$new 1;", 1, "Expected identifier after new when read 1"},
       {"$new a::\n;", 2, "Expected identifier after :: when read ;"},

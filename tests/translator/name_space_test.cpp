@@ -43,6 +43,40 @@ TEST_F(LookUp, CurrentNameSpaceThenRoot) {
   });
 }
 
+// The head of a definition, and the names that lead to what it holds; one brace closes all of them.
+TEST_F(LookUp, HeadsOfNameSpaces) {
+  static constexpr struct {
+    std::string_view head, path;
+  } kHeads[] = {
+      {"namespace a::b::inline c", "a::b::c::"},
+      {"inline namespace a", "a::"},
+      {"namespace [[deprecated(\"x\")]] a::b", "a::b::"},
+      {"namespace std _GLIBCXX_VISIBILITY(default)", "std::"},
+      {"namespace EXPORT a __attribute__((visibility(\"default\")))", "a::"},
+      {"namespace a EXPORT", "a::"},
+      {"namespace A", "A::"},
+  };
+  for (const auto& [head, path] : kHeads) {
+    const std::string text = std::string(head) + " { $struct S { }; }\n";
+    EXPECT_EQ("", Fault(text + "$struct T { }; $type+ ::T; $type+ " + std::string(path) + "S;")) << head;
+    MakeWorld(TargetType::Application);
+  }
+}
+
+TEST_F(LookUp, NamespaceInPlainText) {
+  for (const std::string text :
+       {"namespace fs = std::filesystem;\n", "namespace fs = ::std::filesystem; int f() { return 1; }\n",
+        "#include <boost/namespace.hpp>\n", "int x = F(namespace);\n", "namespace M(x)\n", "namespace M(x) ;\n",
+        "#define OPEN namespace x {\n#define CLOSE }\n",
+        "  # define OPEN(a, b) \\\n  namespace a##b {\n#define CLOSE }\n", "namespace a::b = c;\n", "namespace 1 { }\n",
+        "namespace\n"}) {
+    EXPECT_EQ(text, Translate("t.cpp", text).substr(0, text.size())) << text;
+    MakeWorld(TargetType::Application);
+    EXPECT_EQ("", Fault(text + "$struct S { }; $type+ ::S;")) << text;
+    MakeWorld(TargetType::Application);
+  }
+}
+
 TEST_F(LookUp, ImportsAreSeenThroughImports) {
   AddHeader("a.h", "namespace n { namespace m { $struct A { }; } }");
   AddFile("b.h", "@import \"a.h\"\nnamespace n { $struct B { }; }");

@@ -140,37 +140,6 @@ bool QrexParser::TranslateAt() {
   return true;
 }
 
-void QrexParser::OpenNameSpace() {
-  CheckNesting(m_savedDepths.size());
-  Advance();
-  const char* const position = current.text.begin;
-  std::string name;
-  if (Is(kIdentifier)) {
-    name = ReadIdentifier();
-  } else if (!Is(kOpenBrace)) {
-    FailExpected("identifier");
-  }
-  NameSpace* opened = Current().FindOrCreateNameSpace(name);
-  if (!opened) {
-    Fail("Can't open namespace " + name + " : " + PrintedElement(*Current().LookupLocal(name)) + " is not a namespace");
-  }
-  if (!opened->position) opened->position = stream.SourcePosition(position);
-  Expect(kOpenBrace, "{");
-  m_nameSpaces.push_back(opened);
-  m_savedDepths.push_back(m_braceDepth);
-  m_braceDepth = 1;
-}
-
-void QrexParser::CloseBrace() {
-  if (m_braceDepth < 1) Fail("Can't match }");
-  Advance();
-  if (--m_braceDepth == 0 && !m_savedDepths.empty()) {
-    m_braceDepth = m_savedDepths.back();
-    m_savedDepths.pop_back();
-    m_nameSpaces.pop_back();
-  }
-}
-
 void QrexParser::Dispatch() {
   for (const Keyword& keyword : m_keywords.fileLevel) {
     if (!Is(keyword.word)) continue;

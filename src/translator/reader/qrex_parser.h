@@ -10,6 +10,7 @@
 #include <cstdint>
 #include <functional>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -146,7 +147,16 @@ class QrexParser : public ExpressionParser {
  private:
   void CheckInclude();
   bool TranslateAt();
+  // --- name_spaces.cpp
+  struct NameSpaceHead {
+    std::vector<LexToken> names;  // one for each level; none of an unnamed one
+    LexToken brace;
+  };
   void OpenNameSpace();
+  std::optional<NameSpaceHead> ReadNameSpaceHead();
+  bool SkipBrackets(int32_t open, int32_t close);
+  bool StandsInDirective(const char* position) const;
+  void EnterNameSpace(const std::string& name, const char* position);
   void CloseBrace();
   void Dispatch();
   bool ParseDecoratorType(TypeCode& type, bool reflected);
@@ -161,7 +171,11 @@ class QrexParser : public ExpressionParser {
   const KeywordTables& m_keywords;
   const char* m_copyPosition;
   std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
-  std::vector<int64_t> m_savedDepths;
+  struct OuterDepth {
+    int64_t braces;
+    size_t nameSpaces;  // how many stand open there
+  };
+  std::vector<OuterDepth> m_savedDepths;  // of the definitions of name spaces that are open
   int64_t m_braceDepth = 0;
 };
 
