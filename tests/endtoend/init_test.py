@@ -32,7 +32,7 @@ def the_first_hour(workspace):
     workspace.shell("cd zoo && git init -q . && git add -A" if shutil.which("git") else "true")
     output = workspace.shell("cd zoo && Qrex zoo.qrex && out/lib/x64/Debug/zoo_app")
     holds(output, "Completed.", 'animals::Animal ["kept here"]\n', "    string8 name = Leo\n",
-          "    animals::Diet diet = Meat\n", "    eats 3.8 kg a day\n", "animals::Diet: Plants Meat Anything\n",
+          "    animals::Diet diet = Meat\n", "    eats 4 kg a day\n", "animals::Diet: Plants Meat Anything\n",
           "Leo had 4.5 kg, as release 1 tells\n")
     lacks(output, "warning")
     equal(untracked(workspace, "zoo"), "")

@@ -25,7 +25,7 @@ int main()
 {
     Register_Project_{{NAME}}_app();
 
-    animals::Animal leo("Leo", animals::Diet::Meat, 190);
+    animals::Animal leo("Leo", animals::Diet::Meat, 200);
     Print(*vesk::Find<vesk::ReflectedClass>("animals::Animal"), &leo);
     xout() << "    eats " << leo.FoodPerDay() << " kg a day\n";
 
