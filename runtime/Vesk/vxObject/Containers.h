@@ -2,6 +2,7 @@
 // Positions are signed, a range is (first, count).
 
 @import "Vesk/vxObject/Text.h"
+@import "Vesk/vxObject/Traits.h"
 
 #include <algorithm>
 #include <deque>
@@ -123,7 +124,7 @@ class DynArray {
   T* m_items = nullptr;
 };
 
-// What the containers share: comparison of the two arrays, and printing of them all as [a,b,c].
+// What the containers share: equality of the two arrays, order and printing as [a,b,c] of them all.
 template <typename T, ssize_t N>
 bool operator==(Array<T, N> const& a, Array<T, N> const& b) {
   return std::equal(a.begin(), a.end(), b.begin());
@@ -132,10 +133,6 @@ template <typename T, ssize_t N>
 bool operator!=(Array<T, N> const& a, Array<T, N> const& b) {
   return !(a == b);
 }
-template <typename T, ssize_t N>
-bool operator<(Array<T, N> const& a, Array<T, N> const& b) {
-  return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
-}
 template <typename T>
 bool operator==(DynArray<T> const& a, DynArray<T> const& b) {
   return std::equal(a.begin(), a.end(), b.begin(), b.end());
@@ -143,10 +140,6 @@ bool operator==(DynArray<T> const& a, DynArray<T> const& b) {
 template <typename T>
 bool operator!=(DynArray<T> const& a, DynArray<T> const& b) {
   return !(a == b);
-}
-template <typename T>
-bool operator<(DynArray<T> const& a, DynArray<T> const& b) {
-  return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
 }
 
 template <typename T>
@@ -179,6 +172,30 @@ struct ContainerTraits<Array<T, N>> : ContainerTraitsOf<T, false, false> {};
 
 template <typename T>
 constexpr bool IsContainer = ContainerTraits<T>::is_container;
+
+template <typename T>
+using EqualItems = decltype(std::declval<T const&>() == std::declval<T const&>());
+
+template <typename T>
+bool ItemLess(T const& a, T const& b) {
+  return a < b;
+}
+template <typename K, typename V>
+bool ItemLess(std::pair<K, V> const& a, std::pair<K, V> const& b) {
+  return a.first == b.first ? a.second < b.second : a.first < b.first;
+}
+
+// The first items that differ decide. They are found by `==`: to ask for a < b and b < a of each, as the standard
+// library does, takes twice the time for each level of containers within containers.
+template <typename T, typename = std::enable_if_t<IsContainer<T>>>
+bool operator<(T const& a, T const& b) {
+  if constexpr (Detects<EqualItems, typename ContainerTraits<T>::element_type>) {
+    const auto [at, other] = std::mismatch(a.begin(), a.end(), b.begin(), b.end());
+    return other != b.end() && (at == a.end() || ItemLess(*at, *other));
+  } else {
+    return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
+  }
+}
 
 template <typename T, typename = std::enable_if_t<IsContainer<T>>>
 xostream& operator<<(xostream& os, T const& items) {

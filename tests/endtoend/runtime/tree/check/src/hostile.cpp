@@ -171,6 +171,25 @@ void CheckHostileVariants()
     for (int i = 0; i < 100000; ++i) deep.insert(deep.end(), {1, 1});
     deep.push_back(0);
     CHECK(Refuses<Tree>(deep), true);
+
+    // As deep as it may be it is compared in no time, also as a key.
+    deep.clear();
+    for (int i = 0; i < 200; ++i) deep.insert(deep.end(), {1, 1});
+    deep.push_back(0);
+    Tree tree;
+    CHECK(Refuses(deep, tree), false);
+    const Tree copy = tree;
+    CHECK(copy == tree && !(copy < tree), true);
+    Bytes keys = {2};
+    for (int leaf : {0, 2})
+    {
+        keys.insert(keys.end(), deep.begin(), deep.end() - 1);
+        keys.push_back(vesk::octet_t(leaf));
+        if (leaf == 2) keys.insert(keys.end(), 4, 0);
+    }
+    vesk::xset<Tree> set;
+    CHECK(Refuses(keys, set), false);
+    CHECK(set.size(), 2);
 }
 
 void CheckHostileNumbers()
