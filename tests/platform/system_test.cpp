@@ -18,7 +18,15 @@ TEST(SystemTest, Commands) {
   EXPECT_EQ(0, RunCommand("true"));
   EXPECT_EQ(127, RunCommand("cmd /c command-that-is-nowhere 2>/dev/null"));
   SetEnvironment("QREX_TEST", "a b");
-  EXPECT_EQ(0, RunCommand("test \"$QREX_TEST\" = 'a b'"));
+  EXPECT_EQ(0, RunCommand("printenv QREX_TEST 1>/dev/null"));
+  // In quotes and outside of them what the shell would act on is text.
+  for (const std::string text : {"$QREX_TEST", "`exit`", "a;exit", "a&b|c", "it's", "*", "a\\b"}) {
+    const std::string made = ::testing::TempDir() + "/" + text;
+    EXPECT_EQ(0, RunCommand("touch \"" + made + "\"")) << text;
+    EXPECT_TRUE(std::filesystem::remove(made)) << text;
+    EXPECT_EQ(0, RunCommand("touch " + made)) << text;
+    EXPECT_TRUE(std::filesystem::remove(made)) << text;
+  }
 }
 
 TEST(SystemTest, CompilerOfTheGccFamily) {
