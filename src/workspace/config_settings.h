@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "macro/mpfw_parser.h"
+#include "platform/system.h"
 
 namespace qrex {
 
@@ -23,7 +24,8 @@ struct PlatformEnvironment {
 };
 
 struct ConfigSettings {
-  SourceFileList sourceFiles;  // every file loaded through the macro layer in this run
+  int64_t begun = platform::SystemFileTime();  // when the run began
+  SourceFileList sourceFiles;                  // every file loaded through the macro layer in this run
   MpfwContext context{sourceFiles};
   std::vector<std::string> virtualTree;
   std::string exportLib;

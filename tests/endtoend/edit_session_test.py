@@ -150,7 +150,6 @@ class Session:
         return re.findall(r'/(\w+\.\w+)\(1\) : error : No cpp directly imports', output)
 
     def run_and_compare(self):
-        time.sleep(0.03)  # what was edited in the tick of its translation is stale again, by intent
         text = self.workspace.run('main.qrex')
         clean = self.workspace.path('clean')
         shutil.rmtree(clean / 'qrexsource', ignore_errors=True)

@@ -1,6 +1,8 @@
 #include "translator/file/translate_file.h"
 
 #include <algorithm>
+#include <chrono>
+#include <thread>
 #include <unordered_set>
 
 #include "lex/scanner.h"
@@ -187,8 +189,18 @@ int64_t TranslationTime(const std::string& target, int64_t readTime, bool isWrit
   return OnScaleOf(stamp, isWritten ? std::min(readTime, stamp) : readTime);
 }
 
+// The stamp of what is read now. The clock of stamps first passes the begin of the run: a source that was saved just
+// ahead of it could bear the stamp of its translation, and be stale again in the next run.
+int64_t ReadingTime(const ConfigSettings& settings) {
+  constexpr int kMostWaits = 100;  // of a fraction of a tick each
+  for (int waits = 0; CurrentStamp() <= settings.begun && waits < kMostWaits; ++waits) {
+    std::this_thread::sleep_for(std::chrono::microseconds(200));
+  }
+  return CurrentStamp();
+}
+
 void WriteTranslation(ScannedFile& file, const std::string& target) {
-  const int64_t readTime = CurrentStamp();
+  const int64_t readTime = ReadingTime(file.host.Settings());
   if (!LoadText(file.sourceText, file.SourcePath(), true)) {
     throw LexScannerException("Couldn't open file " + file.SourcePath(), nullptr)
         .WithHint(file.file.project->ListingHint(file.file));
@@ -251,7 +263,7 @@ void BringUpToDate(ScannedFile& file) {
     WriteTranslation(file, target);
   } else if (file.needsWriting) {
     file.needsWriting = false;
-    const int64_t readTime = CurrentStamp();
+    const int64_t readTime = ReadingTime(file.host.Settings());
     if (CopySource(file, target)) file.translationTime = TranslationTime(target, readTime, true);
     file.latestTargetTime = file.targetTime = 0;
   }
