@@ -2,21 +2,15 @@
 #pragma once
 
 #include <map>
-#include <optional>
 #include <string>
 #include <vector>
 
 #include "macro/mpfw_parser.h"
+#include "workspace/compilers.h"
 
 namespace qrex {
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
-
-enum class CompilerKind { vc6, vc8, vc9, vc10, vc11, vc12, vc14, gcc, winegcc, clang };
-inline bool IsVisualCpp(CompilerKind kind) { return kind < CompilerKind::gcc; }
-inline bool IsGccFamily(CompilerKind kind) { return kind >= CompilerKind::gcc; }
-std::string_view CompilerKeyword(CompilerKind kind);  // "vc6" .. "clang"
-std::optional<CompilerKind> FindCompiler(std::string_view keyword);
 
 struct PlatformEnvironment {
   std::string PATH, INCLUDE, LIB;  // `;`-separated lists
