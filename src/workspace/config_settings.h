@@ -18,7 +18,8 @@ struct PlatformEnvironment {
 
 struct ConfigSettings {
   SourceFileList sourceFiles;  // every file loaded through the macro layer in this run
-  MpfwContext context{sourceFiles};
+  MacroWorld macroWorld;
+  MpfwContext context{sourceFiles, macroWorld};
   std::vector<std::string> virtualTree;
   std::string exportLib;
   std::string exportTranslatedInclude;
