@@ -97,16 +97,10 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
 
 std::string LinkCommand(const ProjectBuilder& builder, const std::string& target) {
   const bool isStatic = builder.project.targetType == TargetType::StaticLibrary;
-  switch (builder.settings.compiler) {
-    case CompilerKind::gcc:
-      return isStatic ? "ar rcs \"" + target + "\"" : "g++";
-    case CompilerKind::clang:
-      return isStatic ? "ar rcs \"" + target + "\"" : "clang++";
-    case CompilerKind::winegcc:
-      return isStatic ? "ar rcs \"" + target + "\"" : "wineg++";
-    default:
-      return isStatic ? "lib.exe" : "link.exe";
-  }
+  const Compiler& compiler = CompilerOf(builder.settings.compiler);
+  if (!isStatic) return std::string(compiler.link);
+  const std::string command(compiler.archive);
+  return compiler.family == CompilerFamily::Gcc ? command + " \"" + target + "\"" : command;
 }
 
 }  // namespace

@@ -160,8 +160,7 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
     file.needsWriting = TailsMoved(file);
   }
   if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
-  if (RunsTools() && isBuild && IsVisualCpp(settings.compiler) && settings.compiler != CompilerKind::vc6 &&
-      kind == FileKind::Rc) {
+  if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
     result = CompileResourceIfStale(file);
   }
   if (RunsTools() && HasObject(file.file) && isWanted) result = CompileIfStale(file);
@@ -208,7 +207,7 @@ bool ProjectBuilder::LinkIfStale() {
                          });
   if (isCurrent) return true;
   if (!LinkTarget(*this, target, inputs)) return false;
-  if (settings.compiler == CompilerKind::vc6 || IsGccFamily(settings.compiler)) return true;
+  if (!CompilerOf(settings.compiler).embedsManifest) return true;
   if (EmbedManifest(*this)) return true;
   DeleteFile(target);  // a target without its manifest must not pass for a good one
   return false;

@@ -67,7 +67,7 @@ std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file,
     writeIncludePaths("-I");
     text << " -o \"" << directory << "/" << file.stem << ".o\"";
   } else {
-    const std::string_view prefix = builder.settings.compiler == CompilerKind::vc6 ? "build_" : "";
+    const std::string_view prefix = CompilerOf(builder.settings.compiler).precompiledPrefix;
     WriteCompilerSwitches(text, file, builder.config);
     writeIncludePaths("/I ");
     text << " /Fp\"" << directory << "/" << prefix << builder.project.name << ".pch\"";
@@ -123,7 +123,7 @@ bool CompileFile(ProjectBuilder& builder, ScannedFile& scanned) {
   if (builder.settings.diagnostics) TraceWriter() << "Compiling " << file.path << "\n";
   return MakeObject(builder, file, builder.IntermediateDirectory() + "/compiler.rsp",
                     CompilerText(builder, file, input),
-                    IsGccFamily(builder.settings.compiler) ? "cmd /c gcc-4 -c" : "cmd /c cl /c");
+                    "cmd /c " + std::string(CompilerOf(builder.settings.compiler).compile));
 }
 
 bool AssembleFile(ProjectBuilder& builder, ScannedFile& scanned) {

@@ -77,7 +77,7 @@ void CommandLine::ReadConfigurationPath(const std::string& argument) {
 void CommandLine::RunParallelBuild() {
   if (const PlatformEnvironment* environment = m_settings.Environment()) ApplyEnvironment(*environment);
   std::string command;
-  if (m_settings.compiler >= CompilerKind::vc10) {
+  if (CompilerOf(m_settings.compiler).buildsWithMSBuild) {
     command = "MSBuild /verbosity:minimal /m /t:Build \"/p:Platform=" + m_settings.platform +
               ";Configuration=" + m_settings.config + "\" build_" + m_solution;
   } else {

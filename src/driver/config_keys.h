@@ -74,12 +74,4 @@ inline constexpr ModeWord kModes[] = {
     {"show", "print where the translation of $COMPILE_FILE_PATH stands"},
 };
 
-inline std::string CompilerWords() {
-  std::string words;
-  for (int i = 0; i <= static_cast<int>(CompilerKind::clang); ++i) {
-    words.append(i > 0 ? " " : "").append(CompilerKeyword(static_cast<CompilerKind>(i)));
-  }
-  return words;
-}
-
 }  // namespace qrex

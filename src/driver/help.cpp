@@ -51,7 +51,7 @@ std::string HelpText() {
     page.Row(kModes[i].word, Word(kModes[i].help, isDefault ? "; the default" : ""));
   }
   page.Heading("Keys with their defaults; $(name) expands in every string");
-  page.Row(Word("compiler = ", CompilerKeyword(defaults.compiler)), "one of " + CompilerWords());
+  page.Row(Word("compiler = ", CompilerOf(defaults.compiler).keyword), "one of " + CompilerWords());
   for (const auto& key : kListKeys) page.Row(Word(key.word, " = { }"), key.help);
   for (const auto& key : kStringKeys) page.Row(Word(key.word, " = \"\""), key.help);
   for (const auto& key : kBoolKeys) page.Row(Word(key.word, defaults.*key.field ? " = true" : " = false"), key.help);

@@ -50,6 +50,7 @@ class WorkspaceRun {
 
   ConfigSettings& m_settings;
   Workspace m_workspace;
+  Generator m_generator;
   int64_t m_errors = 0;
   int64_t m_warnings = 0;
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
@@ -139,7 +140,7 @@ bool WorkspaceRun::Run(ScopeTimer& timer) {
 
 bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   m_workspace.SortProjects();
-  if (m_settings.compiler != CompilerKind::vc6) m_workspace.SyncProjectGuids();
+  if (CompilerOf(m_settings.compiler).keepsGuids) m_workspace.SyncProjectGuids();
   if (m_settings.mode == RunMode::Gen) {
     MemoryTextWriter names;
     for (const auto& project : m_workspace.projects) {
@@ -193,9 +194,9 @@ void WorkspaceRun::GenerateProject(Project& project) {
   Prepare(project);
   project.CollectFiles();
   if (!project.exported) CreateMissingFiles(project);
-  GenerateProjectFile(project, false);
+  m_generator.WriteProject(project, Form::Plain);
   if (!project.exported) WriteExportedProject(project);
-  if (project.usesQrex) GenerateProjectFile(project, true);
+  if (project.usesQrex) m_generator.WriteProject(project, Form::Translated);
 }
 
 void WorkspaceRun::Prepare(const Project& project) {
@@ -307,8 +308,8 @@ void WorkspaceRun::GenerateWorkspace() {
   if (IsVisualCpp(m_settings.compiler) && !m_settings.platformEnvironments.empty()) {
     ApplyEnvironment(m_settings.platformEnvironments.begin()->second);
   }
-  GenerateWorkspaceFile(m_workspace, false);
-  if (AnyProjectUsesQrex(m_workspace)) GenerateWorkspaceFile(m_workspace, true);
+  m_generator.WriteWorkspace(m_workspace, Form::Plain);
+  if (AnyProjectUsesQrex(m_workspace)) m_generator.WriteWorkspace(m_workspace, Form::Translated);
 }
 
 // --- One file

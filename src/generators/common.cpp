@@ -26,9 +26,8 @@ const Project* FindDependency(const Project& project, const std::string& path) {
   return dependency;
 }
 
-bool HoldsProjectFile(const Project& project, const ProjectFolder& parent, const ProjectFolder& folder,
-                      bool buildPrefix) {
-  return !buildPrefix && &parent == &project.rootFolder && folder.name == "src";
+bool HoldsProjectFile(const Project& project, const ProjectFolder& parent, const ProjectFolder& folder, Form form) {
+  return form == Form::Plain && &parent == &project.rootFolder && folder.name == "src";
 }
 
 std::string ProjectFileEntry(const Project& project, std::string_view base) {

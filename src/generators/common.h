@@ -10,6 +10,7 @@
 #include <string_view>
 #include <vector>
 
+#include "generators/form.h"
 #include "text/text_writer.h"
 #include "workspace/workspace.h"
 
@@ -18,8 +19,11 @@ namespace qrex {
 bool AnyProjectUsesQrex(const Workspace& workspace);
 
 // True when this form of the project lists translated files.
-inline bool IsTranslatedForm(const Project& project, bool buildPrefix) { return buildPrefix && project.usesQrex; }
-inline std::string_view NamePrefix(bool buildPrefix) { return buildPrefix ? "build_" : ""; }
+inline bool IsTranslatedForm(const Project& project, Form form) { return form == Form::Translated && project.usesQrex; }
+inline Form FormOf(const Project& project, Form form) {
+  return IsTranslatedForm(project, form) ? Form::Translated : Form::Plain;
+}
+inline std::string_view NamePrefix(Form form) { return form == Form::Translated ? "build_" : ""; }
 
 // The text between the last `/` and the last `.` of a subproject's path; empty when there is none.
 std::string SubprojectName(std::string_view path);
@@ -34,8 +38,7 @@ inline bool IsLeftOut(const Project& project, const ProjectFile& file) {
 }
 
 // The folder in which the unprefixed form lists the project file itself: "src" under the root.
-bool HoldsProjectFile(const Project& project, const ProjectFolder& parent, const ProjectFolder& folder,
-                      bool buildPrefix);
+bool HoldsProjectFile(const Project& project, const ProjectFolder& parent, const ProjectFolder& folder, Form form);
 std::string ProjectFileEntry(const Project& project, std::string_view base);  // base/sourceDir/name.qrpj
 
 }  // namespace qrex

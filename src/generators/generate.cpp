@@ -1,8 +1,6 @@
 #include "generators/generate.h"
 
 #include <string>
-#include <type_traits>
-#include <unordered_set>
 
 #include "generators/codeblocks.h"
 #include "generators/common.h"
@@ -18,39 +16,8 @@ namespace qrex {
 
 namespace {
 
-// Of the project or workspace at hand. The gcc family has one form of its files, so that the pass with the prefix would
-// compose and compare them once more.
-std::unordered_set<std::string> upToDate;
-bool isSecondPass = false;
-
-void BeginPass(bool buildPrefix) {
-  isSecondPass = buildPrefix;
-  if (!buildPrefix) upToDate.clear();
-}
-
-// Composes one file in memory and hands it over.
-template <typename... Args>
-void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args) {
-  if (isSecondPass && upToDate.contains(path)) {
-    TraceWriter() << "Skipping " << path << "\n";
-    return;
-  }
-  MemoryTextWriter out;
-  write(out, args...);
-  if (UpdateFile(out, path) != FileUpdate::Failed) upToDate.insert(path);
-}
-
 std::string MakeFileName(const std::string& name, const ProjectConfig& config) {
   return "make_" + name + "_" + config.platform + "_" + config.name;
-}
-
-void GenerateGccProject(Project& project) {
-  if (!project.exported) {
-    for (const auto& config : project.configs) {
-      Generate(MakeFileName(project.name, *config), WriteProjectMakeFile, project, *config);
-    }
-  }
-  Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
 }
 
 std::unordered_set<std::string> ProjectMakeFiles(const Workspace& workspace) {
@@ -62,7 +29,36 @@ std::unordered_set<std::string> ProjectMakeFiles(const Workspace& workspace) {
   return names;
 }
 
-void GenerateGccWorkspace(const Workspace& workspace) {
+}  // namespace
+
+void Generator::BeginPass(Form form) {
+  m_form = form;
+  if (form == Form::Plain) m_upToDate.clear();
+}
+
+// Composes one file in memory and hands it over.
+template <typename... Args>
+void Generator::Generate(const std::string& path, void (*write)(TextWriter&, Args...),
+                         std::type_identity_t<Args>... args) {
+  if (m_form == Form::Translated && m_upToDate.contains(path)) {
+    TraceWriter() << "Skipping " << path << "\n";
+    return;
+  }
+  MemoryTextWriter out;
+  write(out, args...);
+  if (UpdateFile(out, path) != FileUpdate::Failed) m_upToDate.insert(path);
+}
+
+void Generator::WriteGccProject(Project& project) {
+  if (!project.exported) {
+    for (const auto& config : project.configs) {
+      Generate(MakeFileName(project.name, *config), WriteProjectMakeFile, project, *config);
+    }
+  }
+  Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
+}
+
+void Generator::WriteGccWorkspace(const Workspace& workspace) {
   if (workspace.projects.empty()) return;
   const std::unordered_set<std::string> taken = ProjectMakeFiles(workspace);
   for (const auto& config : workspace.projects.front()->configs) {
@@ -75,37 +71,38 @@ void GenerateGccWorkspace(const Workspace& workspace) {
   }
   Generate("makefile", WriteTopMakeFile, workspace);
   Generate(workspace.name + ".make", WriteTopMakeFile, workspace);
-  upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies
+  m_upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies
   Generate(workspace.name + ".workspace", WriteCodeBlocksWorkspace, workspace);
   Generate(workspace.name + ".geany", WriteGeanyProject, workspace);
 }
 
-}  // namespace
-
-void GenerateProjectFile(Project& project, bool buildPrefix) {
-  BeginPass(buildPrefix);
-  const CompilerKind compiler = project.settings->compiler;
-  if (IsGccFamily(compiler)) return GenerateGccProject(project);
-  const std::string stem = std::string(NamePrefix(buildPrefix)) + project.name;
-  if (compiler == CompilerKind::vc6) {
-    Generate(stem + ".dsp", WriteVc6Project, project, buildPrefix);
-  } else if (compiler < CompilerKind::vc10) {
-    Generate(stem + ".vcproj", WriteVc8Project, project, buildPrefix);
-  } else {
-    Generate(stem + ".vcxproj", WriteVc10Project, project, buildPrefix);
-    Generate(stem + ".vcxproj.filters", WriteVc10Filters, project, buildPrefix);
+void Generator::WriteProject(Project& project, Form form) {
+  BeginPass(form);
+  const std::string stem = std::string(NamePrefix(form)) + project.name;
+  switch (CompilerOf(project.settings->compiler).format) {
+    case ProjectFormat::Dsp:
+      return Generate(stem + ".dsp", WriteVc6Project, project, form);
+    case ProjectFormat::Vcproj:
+      return Generate(stem + ".vcproj", WriteVc8Project, project, form);
+    case ProjectFormat::Vcxproj:
+      Generate(stem + ".vcxproj", WriteVc10Project, project, form);
+      return Generate(stem + ".vcxproj.filters", WriteVc10Filters, project, form);
+    case ProjectFormat::Make:
+      return WriteGccProject(project);
   }
 }
 
-void GenerateWorkspaceFile(Workspace& workspace, bool buildPrefix) {
-  BeginPass(buildPrefix);
-  const CompilerKind compiler = workspace.settings.compiler;
-  if (IsGccFamily(compiler)) return GenerateGccWorkspace(workspace);
-  const std::string stem = std::string(NamePrefix(buildPrefix)) + workspace.name;
-  if (compiler == CompilerKind::vc6) {
-    Generate(stem + ".dsw", WriteVc6Workspace, workspace, buildPrefix);
-  } else {
-    Generate(stem + ".sln", WriteSolution, workspace, buildPrefix);
+void Generator::WriteWorkspace(Workspace& workspace, Form form) {
+  BeginPass(form);
+  const std::string stem = std::string(NamePrefix(form)) + workspace.name;
+  switch (CompilerOf(workspace.settings.compiler).format) {
+    case ProjectFormat::Dsp:
+      return Generate(stem + ".dsw", WriteVc6Workspace, workspace, form);
+    case ProjectFormat::Vcproj:
+    case ProjectFormat::Vcxproj:
+      return Generate(stem + ".sln", WriteSolution, workspace, form);
+    case ProjectFormat::Make:
+      return WriteGccWorkspace(workspace);
   }
 }
 

@@ -1,13 +1,34 @@
 // Which project, workspace and make files a compiler needs, and under which names.
 #pragma once
 
+#include <string>
+#include <type_traits>
+#include <unordered_set>
+
+#include "generators/form.h"
+#include "text/text_writer.h"
 #include "workspace/workspace.h"
 
 namespace qrex {
 
-// With `buildPrefix` the files are those of the translated build, named "build_..."; the gcc family has one form only.
-// Files land in the current directory, by WriteIfChanged: a file that cannot be written costs an "Error: " line.
-void GenerateProjectFile(Project& project, bool buildPrefix);
-void GenerateWorkspaceFile(Workspace& workspace, bool buildPrefix);
+// Writes the files of the projects and workspaces of one run, the plain form of each ahead of the translated one.
+// Files land in the current directory, by UpdateFile: a file that cannot be written costs an "Error: " line.
+class Generator {
+ public:
+  void WriteProject(Project& project, Form form);
+  void WriteWorkspace(Workspace& workspace, Form form);
+
+ private:
+  void BeginPass(Form form);
+  template <typename... Args>
+  void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args);
+  void WriteGccProject(Project& project);
+  void WriteGccWorkspace(const Workspace& workspace);
+
+  // Files of the project or workspace that are up to date. The gcc family has one form of its files: the second pass
+  // leaves out what the first one wrote.
+  std::unordered_set<std::string> m_upToDate;
+  Form m_form = Form::Plain;
+};
 
 }  // namespace qrex

@@ -9,22 +9,6 @@ namespace qrex {
 
 namespace {
 
-// The format version and the product, by compiler.
-std::string_view Header(CompilerKind compiler) {
-  switch (compiler) {
-    case CompilerKind::vc8:
-      return "Microsoft Visual Studio Solution File, Format Version 9.00\n# Visual Studio 2005\n";
-    case CompilerKind::vc9:
-      return "Microsoft Visual Studio Solution File, Format Version 10.00\n# Visual Studio 2008\n";
-    case CompilerKind::vc10:
-      return "Microsoft Visual Studio Solution File, Format Version 11.00\n# Visual Studio 2010\n";
-    case CompilerKind::vc11:
-      return "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2012\n";
-    default:
-      return "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2013\n";
-  }
-}
-
 bool IsListed(const Project& project) {
   return !project.exported || project.settings->solutionContainsPrepackagedProjects;
 }
@@ -39,19 +23,19 @@ void WriteDependencies(TextWriter& out, const Project& project) {
   out << "\tEndProjectSection\n";
 }
 
-void WriteProject(TextWriter& out, const Project& project, bool buildPrefix) {
-  const bool isNewFormat = project.settings->compiler >= CompilerKind::vc10;
+void WriteProject(TextWriter& out, const Project& project, Form form) {
+  const bool isNewFormat = CompilerOf(project.settings->compiler).format == ProjectFormat::Vcxproj;
   out << "Project(\"{8BC9CEB8-8B4A-11D0-8D11-00A0C91BC942}\") = \"" << project.name << "\", \""
-      << NamePrefix(IsTranslatedForm(project, buildPrefix)) << project.name << (isNewFormat ? ".vcxproj" : ".vcproj")
-      << "\", \"" << GuidText(project.guid) << "\"\n";
+      << NamePrefix(FormOf(project, form)) << project.name << (isNewFormat ? ".vcxproj" : ".vcproj") << "\", \""
+      << GuidText(project.guid) << "\"\n";
   // The newer project files name their dependencies themselves.
   if (!isNewFormat && !project.subprojects.empty()) WriteDependencies(out, project);
   out << "EndProject\n";
 }
 
 // A translated project takes no part in the build of the plain solution.
-void WriteConfigurations(TextWriter& out, const Project& project, bool buildPrefix) {
-  const bool isBuilt = buildPrefix || !project.usesQrex;
+void WriteConfigurations(TextWriter& out, const Project& project, Form form) {
+  const bool isBuilt = form == Form::Translated || !project.usesQrex;
   for (const auto& config : project.configs) {
     const std::string spec = ConfigSpec(*config);
     const std::string key = GuidText(project.guid) + "." + spec;
@@ -62,11 +46,11 @@ void WriteConfigurations(TextWriter& out, const Project& project, bool buildPref
 
 }  // namespace
 
-void WriteSolution(TextWriter& out, const Workspace& workspace, bool buildPrefix) {
-  out << "\xEF\xBB\xBF\n" << Header(workspace.settings.compiler);
+void WriteSolution(TextWriter& out, const Workspace& workspace, Form form) {
+  out << "\xEF\xBB\xBF\n" << CompilerOf(workspace.settings.compiler).solutionHeader;
   std::set<std::string> specs;  // also those of projects that are not listed
   for (const auto& project : workspace.projects) {
-    if (IsListed(*project)) WriteProject(out, *project, buildPrefix);
+    if (IsListed(*project)) WriteProject(out, *project, form);
     for (const auto& config : project->configs) specs.insert(ConfigSpec(*config));
   }
   out << "Global\n"
@@ -75,7 +59,7 @@ void WriteSolution(TextWriter& out, const Workspace& workspace, bool buildPrefix
   out << "\tEndGlobalSection\n"
       << "\tGlobalSection(ProjectConfigurationPlatforms) = postSolution\n";
   for (const auto& project : workspace.projects) {
-    if (IsListed(*project)) WriteConfigurations(out, *project, buildPrefix);
+    if (IsListed(*project)) WriteConfigurations(out, *project, form);
   }
   out << "\tEndGlobalSection\n"
       << "\tGlobalSection(SolutionProperties) = preSolution\n"

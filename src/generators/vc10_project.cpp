@@ -64,17 +64,6 @@ std::string_view ConfigurationType(TargetType type) {
   return kNames[static_cast<size_t>(type)];
 }
 
-std::string_view ToolsVersion(CompilerKind compiler) {
-  if (compiler == CompilerKind::vc14) return "14.0";
-  return compiler == CompilerKind::vc12 ? "12.0" : "4.0";
-}
-
-std::string_view Toolset(CompilerKind compiler) {
-  if (compiler == CompilerKind::vc14) return "v140";
-  if (compiler == CompilerKind::vc12) return "v120";
-  return compiler == CompilerKind::vc11 ? "v110" : "";
-}
-
 std::string_view ItemName(const ProjectFile& file) {
   if (file.excluded) return "None";
   switch (file.kind) {
@@ -92,8 +81,8 @@ std::string_view ItemName(const ProjectFile& file) {
   }
 }
 
-std::string TranslatedRoot(const Project& project, bool buildPrefix) {
-  if (!IsTranslatedForm(project, buildPrefix)) return project.rootDir;
+std::string TranslatedRoot(const Project& project, Form form) {
+  if (!IsTranslatedForm(project, form)) return project.rootDir;
   const ConfigSettings& settings = *project.settings;
   if (settings.platform.empty()) return "qrexsource/$(Platform)/$(Configuration)";
   return "qrexsource/" + settings.platform + "/" + settings.config;
@@ -113,23 +102,23 @@ struct ItemList {
 };
 
 void AddItems(const Project& project, const ProjectFolder& folder, const std::string& filter, const std::string& root,
-              bool buildPrefix, ItemList& list) {
+              Form form, ItemList& list) {
   for (const auto& subfolder : folder.subfolders) {
     const std::string subfilter = filter.empty() ? subfolder->name : filter + "\\" + subfolder->name;
     list.filters.push_back(subfilter);
-    if (HoldsProjectFile(project, folder, *subfolder, buildPrefix)) {
+    if (HoldsProjectFile(project, folder, *subfolder, form)) {
       list.items.push_back({ProjectFileEntry(project, root), subfilter, nullptr});
     }
-    AddItems(project, *subfolder, subfilter, root, buildPrefix, list);
+    AddItems(project, *subfolder, subfilter, root, form, list);
   }
   for (const ProjectFile* file : folder.files) {
     if (!IsLeftOut(project, *file)) list.items.push_back({PathJoin(root, file->path), filter, file});
   }
 }
 
-ItemList ItemsOf(const Project& project, bool buildPrefix) {
+ItemList ItemsOf(const Project& project, Form form) {
   ItemList list;
-  AddItems(project, project.rootFolder, "", TranslatedRoot(project, buildPrefix), buildPrefix, list);
+  AddItems(project, project.rootFolder, "", TranslatedRoot(project, form), form, list);
   return list;
 }
 
@@ -163,8 +152,7 @@ std::string Condition(const ProjectConfig& config) {
 
 class ProjectWriter {
  public:
-  ProjectWriter(TextWriter& out, Project& project, bool buildPrefix)
-      : m_out(out), m_project(project), m_buildPrefix(buildPrefix) {}
+  ProjectWriter(TextWriter& out, Project& project, Form form) : m_out(out), m_project(project), m_form(form) {}
   void Write();
 
  private:
@@ -194,13 +182,13 @@ class ProjectWriter {
 
   TextWriter& m_out;
   Project& m_project;
-  const bool m_buildPrefix;
+  const Form m_form;
 };
 
 void ProjectWriter::Write() {
   for (const auto& config : m_project.configs) config->linkerOptions = LinkerOptions(m_project, *config);
   m_out << kHead;
-  const std::string version(ToolsVersion(m_project.settings->compiler));
+  const std::string version(CompilerOf(m_project.settings->compiler).projectVersion);
   Element project(
       m_out, "Project",
       R"(DefaultTargets="Build" )" + Attribute("ToolsVersion", version) + " " + Attribute("xmlns", kNameSpace));
@@ -247,7 +235,7 @@ void ProjectWriter::WriteConfigurations() {
 void ProjectWriter::WriteConfigurationGroup(const ProjectConfig& config) {
   Element group(m_out, "PropertyGroup", Condition(config) + R"( Label="Configuration")");
   WriteValue("ConfigurationType", ConfigurationType(m_project.targetType));
-  const std::string_view toolset = Toolset(m_project.settings->compiler);
+  const std::string_view toolset = CompilerOf(m_project.settings->compiler).toolset;
   if (!toolset.empty()) {
     WriteValue("PlatformToolset", std::string(toolset) + (m_project.settings->targetXP ? "_xp" : ""));
   }
@@ -271,7 +259,7 @@ void ProjectWriter::WriteOutputs(const ProjectConfig& config) {
   if (auto manifest = config.linkerOptions.find("GenerateManifest"); manifest != config.linkerOptions.end()) {
     WriteValue("GenerateManifest", manifest->second == "0" || manifest->second == "false" ? "false" : "true");
   }
-  if (m_buildPrefix) WriteValue("TargetName", m_project.name);
+  if (m_form == Form::Translated) WriteValue("TargetName", m_project.name);
 }
 
 void ProjectWriter::WriteTools(const ProjectConfig& config) {
@@ -374,7 +362,7 @@ void ProjectWriter::WriteLinkerTool(const ProjectConfig& config) {
 
 void ProjectWriter::WriteFiles() {
   Element group(m_out, "ItemGroup");
-  for (const Item& item : ItemsOf(m_project, m_buildPrefix).items) {
+  for (const Item& item : ItemsOf(m_project, m_form).items) {
     const std::string_view name = item.file ? ItemName(*item.file) : "None";
     if (name == "ClCompile") {
       WriteSource(item);
@@ -420,7 +408,7 @@ void ProjectWriter::WriteAssemblerFile(const Item& item) {
 void ProjectWriter::WriteReference(const std::string& subproject) {
   const Project* dependency = FindDependency(m_project, subproject);
   if (!dependency || dependency->exported) return;
-  const std::string prefix(NamePrefix(IsTranslatedForm(*dependency, m_buildPrefix)));
+  const std::string prefix(NamePrefix(FormOf(*dependency, m_form)));
   Element reference(m_out, "ProjectReference", Attribute("Include", prefix + dependency->name + ".vcxproj"));
   WriteValue("Project", GuidText(dependency->guid));
   WriteValue("ReferenceOutputAssembly", "false");
@@ -460,17 +448,15 @@ bool ProjectWriter::WriteEnumerated(const OptionMap& options, const EnumeratedOp
 }
 
 void ProjectWriter::WriteIncludes(const ProjectConfig& config, std::string_view value) {
-  WriteInherited("AdditionalIncludeDirectories", IncludeList(m_project, config, value, m_buildPrefix), ";");
+  WriteInherited("AdditionalIncludeDirectories", IncludeList(m_project, config, value, m_form), ";");
 }
 
 }  // namespace
 
-void WriteVc10Project(TextWriter& out, Project& project, bool buildPrefix) {
-  ProjectWriter(out, project, buildPrefix).Write();
-}
+void WriteVc10Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).Write(); }
 
-void WriteVc10Filters(TextWriter& out, Project& project, bool buildPrefix) {
-  const ItemList list = ItemsOf(project, buildPrefix);
+void WriteVc10Filters(TextWriter& out, Project& project, Form form) {
+  const ItemList list = ItemsOf(project, form);
   out << kHead;
   Element root(out, "Project", R"(ToolsVersion="4.0" )" + Attribute("xmlns", kNameSpace));
   {

@@ -15,8 +15,8 @@ std::string_view TargetId(TargetType type) {
 
 class ProjectWriter {
  public:
-  ProjectWriter(TextWriter& out, const Project& project, bool buildPrefix)
-      : m_out(out), m_project(project), m_name(project.name), m_buildPrefix(buildPrefix) {}
+  ProjectWriter(TextWriter& out, const Project& project, Form form)
+      : m_out(out), m_project(project), m_name(project.name), m_form(form) {}
   void Write();
 
  private:
@@ -32,7 +32,7 @@ class ProjectWriter {
   TextWriter& m_out;
   const Project& m_project;
   const std::string& m_name;
-  const bool m_buildPrefix;
+  const Form m_form;
 };
 
 void ProjectWriter::Write() {
@@ -98,7 +98,7 @@ void ProjectWriter::WriteConfig(const ProjectConfig& config) {
         << "# PROP Ignore_Export_Lib 0\n"
         << "# PROP Target_Dir \"\"\n"
         << "# ADD CPP " << config.compilerText;
-  for (const std::string& path : IncludePaths(m_project, config, IsTranslatedForm(m_project, m_buildPrefix))) {
+  for (const std::string& path : IncludePaths(m_project, config, IsTranslatedForm(m_project, m_form))) {
     m_out << " /I \"" << path << "\"";
   }
   m_out << "\n"
@@ -122,10 +122,10 @@ void ProjectWriter::WriteConfig(const ProjectConfig& config) {
 void ProjectWriter::WriteTarget() {
   m_out << "# Begin Target\n";
   for (const auto& config : m_project.configs) m_out << "# Name \"" << ConfigName(*config) << "\"\n";
-  const std::string base = IsTranslatedForm(m_project, m_buildPrefix) ? "qrexsource" : m_project.rootDir;
+  const std::string base = IsTranslatedForm(m_project, m_form) ? "qrexsource" : m_project.rootDir;
   const std::string prefix = PathJoin(base, m_project.rootToProjDir) + "/";
   WriteFolder(m_project.rootFolder, prefix);
-  if (!m_buildPrefix) {
+  if (m_form == Form::Plain) {
     m_out << "# Begin Source File\n"
           << "SOURCE=" << prefix << m_name << ".qrpj\n"
           << "# End Source File\n";
@@ -170,16 +170,14 @@ void ProjectWriter::WriteBranch(bool isFirst, const ProjectConfig& config) {
 
 }  // namespace
 
-void WriteVc6Project(TextWriter& out, Project& project, bool buildPrefix) {
-  ProjectWriter(out, project, buildPrefix).Write();
-}
+void WriteVc6Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).Write(); }
 
-void WriteVc6Workspace(TextWriter& out, const Workspace& workspace, bool buildPrefix) {
+void WriteVc6Workspace(TextWriter& out, const Workspace& workspace, Form form) {
   out << "Microsoft Developer Studio Workspace File, Format Version 6.00\n"
       << "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\n"
       << "\n";
   for (const auto& project : workspace.projects) {
-    const std::string_view prefix = NamePrefix(IsTranslatedForm(*project, buildPrefix));
+    const std::string_view prefix = NamePrefix(FormOf(*project, form));
     out << std::string(79, '#') << "\n"
         << "\n"
         << "Project: \"" << project->name << "\"=./" << prefix << project->name << ".dsp - Package Owner=<4>\n"

@@ -27,12 +27,12 @@ std::string_view ConfigurationType(TargetType type) {
 
 class ProjectWriter {
  public:
-  ProjectWriter(TextWriter& out, Project& project, bool buildPrefix)
+  ProjectWriter(TextWriter& out, Project& project, Form form)
       : m_out(out),
         m_project(project),
-        m_buildPrefix(buildPrefix),
-        m_filesBase(IsTranslatedForm(project, buildPrefix) ? "qrexsource/$(PlatformName)/$(ConfigurationName)"
-                                                           : project.rootDir) {}
+        m_form(form),
+        m_filesBase(IsTranslatedForm(project, form) ? "qrexsource/$(PlatformName)/$(ConfigurationName)"
+                                                    : project.rootDir) {}
   void Write();
 
  private:
@@ -50,7 +50,7 @@ class ProjectWriter {
 
   TextWriter& m_out;
   Project& m_project;
-  const bool m_buildPrefix;
+  const Form m_form;
   const std::string m_filesBase;
 };
 
@@ -59,7 +59,7 @@ void ProjectWriter::Write() {
   m_out << "<?xml version=\"1.0\" encoding=\"Windows-1252\"?>\n"
         << "<VisualStudioProject\n"
         << "\tProjectType=\"Visual C++\"\n"
-        << "\tVersion=\"" << (m_project.settings->compiler == CompilerKind::vc8 ? "8.00" : "9.00") << "\"\n"
+        << "\tVersion=\"" << CompilerOf(m_project.settings->compiler).projectVersion << "\"\n"
         << "\tName=\"" << m_project.name << "\"\n"
         << "\tProjectGUID=\"" << GuidText(m_project.guid) << "\"\n"
         << "\t>\n";
@@ -141,7 +141,7 @@ void ProjectWriter::WriteTool(std::string_view tool, const OptionMap& options, c
         << "\t\t\t\tName=\"" << tool << "\"\n";
   for (const auto& [property, value] : options) {
     const bool isIncludes = property == "AdditionalIncludeDirectories";
-    WriteAttribute(4, property, isIncludes ? IncludeList(m_project, config, value, m_buildPrefix) : value);
+    WriteAttribute(4, property, isIncludes ? IncludeList(m_project, config, value, m_form) : value);
   }
   m_out << "\t\t\t/>\n";
 }
@@ -153,7 +153,7 @@ void ProjectWriter::WriteFolder(const ProjectFolder& folder, int depth) {
     m_out << Tabs(depth) << "<Filter\n"
           << Tabs(depth) << "\tName=\"" << subfolder->name << "\"\n"
           << Tabs(depth) << "\t>\n";
-    if (HoldsProjectFile(m_project, folder, *subfolder, m_buildPrefix)) {
+    if (HoldsProjectFile(m_project, folder, *subfolder, m_form)) {
       OpenFile(ProjectFileEntry(m_project, m_filesBase), depth + 1);
       m_out << Tabs(depth + 1) << "</File>\n";
     }
@@ -223,8 +223,6 @@ void ProjectWriter::WriteAttributes(int depth, const OptionMap& options) {
 
 }  // namespace
 
-void WriteVc8Project(TextWriter& out, Project& project, bool buildPrefix) {
-  ProjectWriter(out, project, buildPrefix).Write();
-}
+void WriteVc8Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).Write(); }
 
 }  // namespace qrex

@@ -8,9 +8,9 @@
 
 namespace qrex {
 
-std::string IncludeList(const Project& project, const ProjectConfig& config, std::string_view value, bool buildPrefix) {
+std::string IncludeList(const Project& project, const ProjectConfig& config, std::string_view value, Form form) {
   static constexpr std::string_view kTree = "$(VIRTUAL_TREE)";
-  const bool isTranslated = IsTranslatedForm(project, buildPrefix);
+  const bool isTranslated = IsTranslatedForm(project, form);
   const std::string base = isTranslated ? TranslationDirectory(config) : project.rootDir;
   std::string list = PathJoin(base, project.rootToProjDir) + ";" + PathJoin(base, project.sourceDir);
   if (isTranslated) list += ";" + base;

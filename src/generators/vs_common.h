@@ -4,6 +4,7 @@
 #include <string>
 #include <string_view>
 
+#include "generators/form.h"
 #include "workspace/project_model.h"
 
 namespace qrex {
@@ -12,7 +13,7 @@ inline std::string ConfigSpec(const ProjectConfig& config) { return config.name 
 
 // What stands in an include property whose option value is `value`: the project's own directories ahead of its items,
 // and for an item that begins with $(VIRTUAL_TREE) one entry for each root.
-std::string IncludeList(const Project& project, const ProjectConfig& config, std::string_view value, bool buildPrefix);
+std::string IncludeList(const Project& project, const ProjectConfig& config, std::string_view value, Form form);
 
 // The properties of the librarian (for a static library) or of the linker.
 OptionMap LinkerOptions(const Project& project, const ProjectConfig& config);

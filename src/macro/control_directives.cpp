@@ -68,7 +68,7 @@ void ExpansionContext::While() {
   DropToScanner();
   const LineIndent column = CurrentColumn();
   for (int64_t i = 0; EvaluateCondition(condition, "@while"); ++i) {
-    if (i == expansionLimits.iterations)
+    if (i == m_world.limits.iterations)
       throw LexScannerException("Too many iterations in @while directive", m_tokenText);
     LSFrame child(&m_frame);
     ExpandBlock(block, child, indent, column);

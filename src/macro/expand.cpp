@@ -12,12 +12,8 @@ namespace {
 
 constexpr int kMaxNesting = 1000;
 constexpr size_t kLargeText = 1u << 20;
-int nesting = 0;
-int64_t parts = 0;  // of the text at nesting 0
 
 }  // namespace
-
-ExpansionLimits expansionLimits;
 
 bool ImportHandler::ImportPath(const std::string&, const char*) { return false; }
 std::string ImportHandler::ImportHint(const std::string&) const { return {}; }
@@ -32,6 +28,7 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
                                    LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor)
     : m_handler(handler),
       m_frame(frame),
+      m_world(frame.World()),
       m_sink(sink),
       m_stripIndent(stripIndent),
       m_outIndent(outIndent),
@@ -42,15 +39,15 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
       m_pendingBegin(text.begin),
       m_settled(text.begin) {
   CheckPart(text);
-  ++nesting;
+  ++m_world.nesting;
 }
 
-ExpansionContext::~ExpansionContext() { --nesting; }
+ExpansionContext::~ExpansionContext() { --m_world.nesting; }
 
 void ExpansionContext::CheckPart(const TextRange& text) const {
-  if (nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
-  if (nesting == 0) parts = 0;
-  if (++parts > expansionLimits.parts) throw LexScannerException("Too many macro expansions", text.begin);
+  if (m_world.nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
+  if (m_world.nesting == 0) m_world.parts = 0;
+  if (++m_world.parts > m_world.limits.parts) throw LexScannerException("Too many macro expansions", text.begin);
   CheckLength(text.Size());
 }
 
@@ -99,6 +96,7 @@ void ExpansionContext::RunToEnd() {
 bool ExpansionContext::ReadPastPlain(LexToken& found) {
   LexScanner ahead = m_scanner;  // a copy, and the token too: they stay in registers
   LexToken token;
+  const NamesInUse& names = m_world.names;
   do {
     m_settled = ahead.begin;
     if (m_stripIndent > 0 && !ahead.AtEnd() && IsBlankByte(*ahead.begin)) {
@@ -107,7 +105,7 @@ bool ExpansionContext::ReadPastPlain(LexToken& found) {
       ahead = m_scanner;
     }
     ReadToken(ahead, token, true);
-  } while (IsPlainToken(token));
+  } while (IsPlainToken(token, names));
   m_here = token.text.begin;
   for (const char* at = m_here; at > m_settled; --at) {
     if (at[-1] == '\n') m_settled = at;
@@ -219,7 +217,7 @@ void ExpansionContext::CopySource(const TextRange& text, LineIndent indent, cons
 void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
 
 void ExpansionContext::CheckLength(size_t added) const {
-  if (static_cast<int64_t>(m_sink.output.size() + added) > expansionLimits.bytes) {
+  if (static_cast<int64_t>(m_sink.output.size() + added) > m_world.limits.bytes) {
     throw LexScannerException("Expanded text is too long", m_tokenText);
   }
 }
@@ -307,10 +305,11 @@ TextRange ExpandWithMap(ImportHandler* handler, LSFrame& frame, const TextRange&
                         int64_t outIndent, std::string& storage, SourceMap& map) {
   // A file counts afresh: a chain of imports may be longer than the nesting of macros.
   struct Restore {
-    int value;
+    int& nesting;
+    const int value = nesting;
     ~Restore() { nesting = value; }
-  } restore{nesting};
-  if (handler) nesting = 0;
+  } restore{frame.World().nesting};
+  if (handler) restore.nesting = 0;
   ExpansionSink sink;
   sink.expectedSize = text.Size() + text.Size() / (text.Size() < kLargeText ? 4 : 1);
   const bool changed = ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).RunUnlessPlain();

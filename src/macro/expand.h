@@ -18,14 +18,6 @@ class ImportHandler {
   virtual ~ImportHandler() = default;
 };
 
-// Bounds on one text with all that it calls: macros that multiply end with a message before time and memory do.
-struct ExpansionLimits {
-  int64_t parts = 100'000'000;  // bodies, blocks, arguments and conditions
-  int64_t bytes = int64_t{1} << 30;
-  int64_t iterations = 1'000'000;  // of one @while
-};
-extern ExpansionLimits expansionLimits;
-
 void Expand(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent, int64_t outIndent,
             ExpansionSink& sink);
 std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent = 0,

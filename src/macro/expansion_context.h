@@ -131,6 +131,7 @@ class ExpansionContext {
 
   ImportHandler* const m_handler;
   LSFrame& m_frame;
+  MacroWorld& m_world;
   ExpansionSink& m_sink;
   const int64_t m_stripIndent;
   LineIndent m_outIndent;
@@ -145,10 +146,10 @@ class ExpansionContext {
 };
 
 // Whether nothing can be expanded in a text of such tokens alone, as long as no new name comes up.
-inline bool IsPlainToken(const LexToken& token) {
+inline bool IsPlainToken(const LexToken& token, const NamesInUse& names) {
   switch (token.kind) {
     case kIdentifier:
-      return !NamesInUse::MayHold(token.text.View());
+      return !names.MayHold(token.text.View());
     case kDoubleQuoted:
       return token.text.View().find("$(") == std::string_view::npos;
     case kMacroComment:

@@ -68,14 +68,15 @@ std::unique_ptr<LSVariable> LSVar::Clone() const { return std::make_unique<LSVar
 
 // --- Frames
 
-LSFrame::LSFrame(LSFrame* parent) : m_parent(parent), m_fileFrame(parent ? parent->m_fileFrame : nullptr) {}
+LSFrame::LSFrame(LSFrame* parent) : m_world(parent->m_world), m_parent(parent), m_fileFrame(parent->m_fileFrame) {}
+LSFrame::LSFrame(MacroWorld& world) : m_world(world) {}
 LSFrame::~LSFrame() = default;
 
 void LSFrame::AddVariable(std::unique_ptr<LSVariable> variable) {
   LSVariable& added = *variable;
   const bool replaces = FindLocal(added.name.View()) != nullptr;
   m_variables.push_back(std::move(variable));
-  NamesInUse::Add(added.name.View());
+  m_world.names.Add(added.name.View());
   if (m_names) {
     EnterInIndex(added);
   } else if (m_variables.size() > kMostWithoutIndex) {
@@ -137,57 +138,26 @@ void LSFrame::WriteFrame(TextWriter& writer) const {
 
 // --- File frames
 
+std::string_view DefinitionTable::Enter(std::string_view name, size_t frame, LSVariable* variable) {
+  auto& [ownName, entries] = *m_entries.try_emplace(std::string(name)).first;
+  entries.push_back({frame, variable});
+  return ownName;
+}
+
+void DefinitionTable::Replace(std::string_view name, size_t frame, LSVariable* variable) {
+  for (Entry& entry : m_entries.find(name)->second) {
+    if (entry.frame == frame) entry.variable = variable;
+  }
+}
+
+void DefinitionTable::Remove(std::string_view name, size_t frame) {
+  auto found = m_entries.find(name);
+  if (found == m_entries.end()) return;
+  std::erase_if(found->second, [&](const Entry& entry) { return entry.frame == frame; });
+  if (found->second.empty()) m_entries.erase(found);
+}
+
 namespace {
-
-// The definitions of each name in all file frames of the process.
-class DefinitionTable {
- public:
-  struct Entry {
-    size_t frame;
-    LSVariable* variable;
-  };
-
-  // The table's own text of the name; it stays until the entry is removed.
-  std::string_view Enter(std::string_view name, size_t frame, LSVariable* variable) {
-    auto& [ownName, entries] = *m_entries.try_emplace(std::string(name)).first;
-    entries.push_back({frame, variable});
-    return ownName;
-  }
-
-  void Replace(std::string_view name, size_t frame, LSVariable* variable) {
-    for (Entry& entry : m_entries.find(name)->second) {
-      if (entry.frame == frame) entry.variable = variable;
-    }
-  }
-
-  void Remove(std::string_view name, size_t frame) {
-    auto found = m_entries.find(name);
-    if (found == m_entries.end()) return;
-    std::erase_if(found->second, [&](const Entry& entry) { return entry.frame == frame; });
-    if (found->second.empty()) m_entries.erase(found);
-  }
-
-  const std::vector<Entry>* Find(std::string_view name) const {
-    auto found = m_entries.find(name);
-    return found == m_entries.end() ? nullptr : &found->second;
-  }
-
- private:
-  struct Hash : std::hash<std::string_view> {
-    using is_transparent = void;
-  };
-  std::unordered_map<std::string, std::vector<Entry>, Hash, std::equal_to<>> m_entries;
-};
-
-DefinitionTable& Definitions() {
-  static DefinitionTable table;
-  return table;
-}
-
-size_t NextFrameIndex() {
-  static size_t next = 0;
-  return next++;
-}
 
 // Every file has its own @filename and the like; they are never looked up through imports.
 bool IsPredefined(std::string_view name) { return name.substr(0, 1) == "@"; }
@@ -197,20 +167,21 @@ constexpr size_t kMaxSubstituted = 64u << 20;
 
 }  // namespace
 
-LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(NextFrameIndex()) { m_fileFrame = this; }
+LSFileFrame::LSFileFrame(MacroWorld& world) : LSFrame(world), m_index(world.fileFrames++) { m_fileFrame = this; }
+LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(m_world.fileFrames++) { m_fileFrame = this; }
 
 LSFileFrame::~LSFileFrame() {
   // Not by the names of the variables: these may stand in the text of another file, which may be gone.
-  for (std::string_view name : m_entered) Definitions().Remove(name, m_index);
+  for (std::string_view name : m_entered) m_world.definitions.Remove(name, m_index);
 }
 
 void LSFileFrame::OnAdded(LSVariable& variable, bool replaces) {
   const std::string_view name = variable.name.View();
   if (IsPredefined(name)) return;
   if (replaces) {
-    Definitions().Replace(name, m_index, &variable);
+    m_world.definitions.Replace(name, m_index, &variable);
   } else {
-    m_entered.push_back(Definitions().Enter(name, m_index, &variable));
+    m_entered.push_back(m_world.definitions.Enter(name, m_index, &variable));
   }
 }
 
@@ -243,7 +214,7 @@ class LSFileFrame::NearestDefinition {
   LSVariable* AmongImports(const LSFileFrame& frame) {
     LSVariable* found = nullptr;
     bool several = false;
-    for (const DefinitionTable::Entry& entry : *Definitions().Find(m_name)) {
+    for (const DefinitionTable::Entry& entry : *frame.m_world.definitions.Find(m_name)) {
       if (!frame.m_allImports.Has(entry.frame)) continue;
       several = found && found != entry.variable;
       found = entry.variable;
@@ -269,7 +240,7 @@ class LSFileFrame::NearestDefinition {
 
 LSVariable* LSFileFrame::FindInFrame(std::string_view name, const char* position) const {
   if (LSVariable* own = FindLocal(name)) return own;
-  if (m_allImports.Empty() || !Definitions().Find(name)) return nullptr;
+  if (m_allImports.Empty() || !m_world.definitions.Find(name)) return nullptr;
   return NearestDefinition(name, position).AmongImports(*this);
 }
 
@@ -281,7 +252,7 @@ void LSFileFrame::DefineSubstitution(const std::string& name, const std::string&
 const std::string* LSFileFrame::FindSubstitution(std::string_view name) const {
   auto own = m_substitutions.find(name);
   if (own != m_substitutions.end()) return &own->second;
-  if (m_orderedImports.empty() || !Definitions().Find("_" + std::string(name) + "_")) return nullptr;
+  if (m_orderedImports.empty() || !m_world.definitions.Find("_" + std::string(name) + "_")) return nullptr;
   std::vector<const LSFileFrame*> pending{this};
   std::unordered_set<const LSFileFrame*> seen;
   while (!pending.empty()) {

@@ -11,6 +11,7 @@
 #include <vector>
 
 #include "lex/token.h"
+#include "macro/macro_world.h"
 #include "text/index_set.h"
 #include "text/text_writer.h"
 
@@ -21,38 +22,6 @@ class LSFileFrame;
 
 enum class VarType : int32_t { Macro = 1, Bool, Int, Double, Char, String };
 VarType TypeCodeOf(std::string_view word);  // Macro: no type keyword
-
-// Which names stand in any frame of the process, roughly: the lengths that begin with each byte, and a bit for some
-// more of a name's bytes. Most words of a text are no names, and are told so without a look into the frames.
-class NamesInUse {
- public:
-  static bool MayHold(std::string_view name) {
-    if ((m_lengths[FirstOf(name)] >> (name.size() % 64) & 1) == 0) return false;
-    const size_t bit = BitOf(name);
-    return (m_bits[bit / 64] >> (bit % 64) & 1) != 0;
-  }
-  static void Add(std::string_view name) {
-    if (MayHold(name)) return;
-    m_lengths[FirstOf(name)] |= uint64_t{1} << (name.size() % 64);
-    const size_t bit = BitOf(name);
-    m_bits[bit / 64] |= uint64_t{1} << (bit % 64);
-    ++m_changes;
-  }
-  static uint64_t Changes() { return m_changes; }  // as long as it stays, so do the answers
-
- private:
-  static constexpr size_t kBits = 16384;
-  static unsigned char ByteOf(std::string_view name, size_t at) { return static_cast<unsigned char>(name[at]); }
-  static unsigned char FirstOf(std::string_view name) { return name.empty() ? 0 : ByteOf(name, 0); }
-  static size_t BitOf(std::string_view name) {
-    if (name.empty()) return 0;
-    const size_t last = name.size() - 1;
-    return ((ByteOf(name, 0) * size_t{31} + ByteOf(name, last)) * 31 + ByteOf(name, last / 2) * 7 + last) % kBits;
-  }
-  static inline uint64_t m_lengths[256];
-  static inline uint64_t m_bits[kBits / 64];
-  static inline uint64_t m_changes = 0;
-};
 
 class LSVariable {
  public:
@@ -83,9 +52,10 @@ class LSMacroVariable : public LSVariable {
   // Makes name, formals and body refer to a copy of `text`, in which they lie now.
   void OwnText(TextRange text);  // by value: it may be one of them
   void OwnBody();                // the same for the body alone
-  // Nothing in the body is to be expanded, so that it can be copied. Forgotten when a name comes up that is new.
-  bool HasPlainBody() const { return m_plainAsOf == NamesInUse::Changes(); }
-  void SetPlainBody() const { m_plainAsOf = NamesInUse::Changes(); }
+  // The body contains nothing to expand, so a call can copy it. The mark becomes invalid as soon as a new name is
+  // defined.
+  bool HasPlainBody(const NamesInUse& names) const { return m_plainAsOf == names.Changes(); }
+  void SetPlainBody(const NamesInUse& names) const { m_plainAsOf = names.Changes(); }
 
   bool isPython = false;
   bool isNaked = false;
@@ -129,7 +99,8 @@ class LSVar : public LSValueVariable {
 // and one with a few is searched without an index.
 class LSFrame {
  public:
-  explicit LSFrame(LSFrame* parent);
+  explicit LSFrame(LSFrame* parent);    // not null
+  explicit LSFrame(MacroWorld& world);  // without a parent, and of no file
   virtual ~LSFrame();
   LSFrame(const LSFrame&) = delete;
   LSFrame& operator=(const LSFrame&) = delete;
@@ -143,6 +114,7 @@ class LSFrame {
 
   LSFrame* Parent() const { return m_parent; }
   LSFileFrame* FileFrame() const { return m_fileFrame; }
+  MacroWorld& World() const { return m_world; }
 
  protected:
   virtual void OnAdded(LSVariable&, bool /*replaces*/) {}
@@ -153,8 +125,9 @@ class LSFrame {
 
   boost::container::small_vector<std::unique_ptr<LSVariable>, 4> m_variables;  // oldest first
   std::unique_ptr<Index> m_names;                                              // the newest of each name; or null
-  LSFrame* m_parent;
-  LSFileFrame* m_fileFrame;
+  MacroWorld& m_world;
+  LSFrame* m_parent = nullptr;
+  LSFileFrame* m_fileFrame = nullptr;
 };
 
 // The frame of a file. Every identifier of every text is looked up through all imports, so this must not cost time that
@@ -162,7 +135,8 @@ class LSFrame {
 // set of the frames that it sees. A name that stands nowhere is answered by one probe.
 class LSFileFrame : public LSFrame {
  public:
-  explicit LSFileFrame(LSFrame* parent = nullptr);
+  explicit LSFileFrame(MacroWorld& world);
+  explicit LSFileFrame(LSFrame* parent);
   ~LSFileFrame() override;
 
   void AddImport(LSFileFrame& imported);

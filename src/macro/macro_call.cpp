@@ -15,7 +15,7 @@ void ExpansionContext::CallVariable(LSVariable& variable) {
   const auto& macro = static_cast<const LSMacroVariable&>(variable);
   // What the body defines may replace the entry, but a frame keeps its variables to its end.
   if (macro.isFunctionArgument) return CallFunctionArgument(macro);
-  if (macro.formals.empty() && macro.HasPlainBody()) {
+  if (macro.formals.empty() && macro.HasPlainBody(m_world.names)) {
     DropToScanner();
     return CopyBody(macro);
   }
@@ -32,8 +32,9 @@ ExpansionContext::BoundArguments ExpansionContext::ReadArguments(const LSMacroVa
   for (const MacroFormal& formal : macro.formals) {
     TextRange text;
     bool isPlain = true;
-    const LexToken end = ReadArgument(m_scanner, text, kCloseParen,
-                                      [&](const LexToken& token) { isPlain = isPlain && IsPlainToken(token); });
+    const LexToken end = ReadArgument(m_scanner, text, kCloseParen, [&](const LexToken& token) {
+      isPlain = isPlain && IsPlainToken(token, m_world.names);
+    });
     const bool isLast = &formal == &macro.formals.back();
     if (!isLast && end.kind == kCloseParen) {
       FailAt(end, "Insufficient arguments provided for macro " + macro.Signature());
@@ -66,7 +67,7 @@ void ExpansionContext::BindArgument(LSFrame& frame, const BoundArgument& argumen
   variable->homeFrame = &m_frame;
   variable->isFunctionArgument = formal.isFunction;
   variable->isTemporary = m_anchor != nullptr;
-  if (argument.isPlain) variable->SetPlainBody();
+  if (argument.isPlain) variable->SetPlainBody(m_world.names);
   // An argument of a naked macro stays in the frame, which may outlive the text.
   if (m_anchor && macro.isNaked) variable->OwnBody();
   frame.AddVariable(std::move(variable));
@@ -111,11 +112,11 @@ void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
 }
 
 void ExpansionContext::ExpandBody(const LSMacroVariable& macro, LSFrame& frame) {
-  if (macro.HasPlainBody()) return CopyBody(macro);
+  if (macro.HasPlainBody(m_world.names)) return CopyBody(macro);
   const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
   ExpansionContext body(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor);
   body.Run();
-  if (body.WasPlain()) macro.SetPlainBody();
+  if (body.WasPlain()) macro.SetPlainBody(m_world.names);
 }
 
 void ExpansionContext::CopyBody(const LSMacroVariable& macro) {

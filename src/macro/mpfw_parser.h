@@ -24,7 +24,7 @@ struct MpfwSourceFile {
 };
 
 struct MpfwContext {
-  explicit MpfwContext(SourceFileList& sourceFiles) : sourceFiles(sourceFiles) {}
+  MpfwContext(SourceFileList& sourceFiles, MacroWorld& world) : sourceFiles(sourceFiles), rootFrame(world) {}
   // The frame starts as a copy of the parent's, which it also has as its parent.
   explicit MpfwContext(MpfwContext& parent) : sourceFiles(parent.sourceFiles), rootFrame(&parent.rootFrame) {
     rootFrame.CopyFrom(parent.rootFrame);

@@ -1,7 +1,5 @@
 #include "workspace/config_settings.h"
 
-#include <algorithm>
-
 #include "platform/console.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -9,19 +7,6 @@
 #include "text/paths.h"
 
 namespace qrex {
-
-namespace {
-constexpr std::string_view kCompilers[] = {"vc6",  "vc8",  "vc9", "vc10",    "vc11",
-                                           "vc12", "vc14", "gcc", "winegcc", "clang"};
-}
-
-std::string_view CompilerKeyword(CompilerKind kind) { return kCompilers[static_cast<size_t>(kind)]; }
-
-std::optional<CompilerKind> FindCompiler(std::string_view keyword) {
-  const auto* const found = std::find(std::begin(kCompilers), std::end(kCompilers), keyword);
-  if (found == std::end(kCompilers)) return std::nullopt;
-  return static_cast<CompilerKind>(found - std::begin(kCompilers));
-}
 
 const PlatformEnvironment* ConfigSettings::Environment() const {
   auto found = platformEnvironments.find(platform);

@@ -2,22 +2,16 @@
 #pragma once
 
 #include <map>
-#include <optional>
 #include <string>
 #include <vector>
 
 #include "macro/mpfw_parser.h"
 #include "platform/system.h"
+#include "workspace/compilers.h"
 
 namespace qrex {
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
-
-enum class CompilerKind { vc6, vc8, vc9, vc10, vc11, vc12, vc14, gcc, winegcc, clang };
-inline bool IsVisualCpp(CompilerKind kind) { return kind < CompilerKind::gcc; }
-inline bool IsGccFamily(CompilerKind kind) { return kind >= CompilerKind::gcc; }
-std::string_view CompilerKeyword(CompilerKind kind);  // "vc6" .. "clang"
-std::optional<CompilerKind> FindCompiler(std::string_view keyword);
 
 struct PlatformEnvironment {
   std::string PATH, INCLUDE, LIB;  // `;`-separated lists
@@ -26,7 +20,8 @@ struct PlatformEnvironment {
 struct ConfigSettings {
   int64_t begun = platform::SystemFileTime();  // when the run began
   SourceFileList sourceFiles;                  // every file loaded through the macro layer in this run
-  MpfwContext context{sourceFiles};
+  MacroWorld macroWorld;
+  MpfwContext context{sourceFiles, macroWorld};
   std::vector<std::string> virtualTree;
   std::string exportLib;
   std::string exportTranslatedInclude;

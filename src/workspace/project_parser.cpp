@@ -297,7 +297,7 @@ bool ProjectParser::IsSelected(const ProjectConfig& config, std::string_view spe
     const size_t bar = spec.find('|');
     const std::string_view part = spec.substr(0, bar);
     const bool fits = part == TargetTypeName(m_project.targetType) ||
-                      part == CompilerKeyword(m_project.settings->compiler) || part == config.name ||
+                      part == CompilerOf(m_project.settings->compiler).keyword || part == config.name ||
                       part == config.platform ||
                       std::find(config.tags.begin(), config.tags.end(), part) != config.tags.end();
     if (!fits) return false;
@@ -318,10 +318,7 @@ bool ProjectParser::NeedsOtherCompiler(std::string_view spec) const {
   });
 }
 
-bool ProjectParser::KeepsRawText() const {
-  const CompilerKind compiler = m_project.settings->compiler;
-  return compiler == CompilerKind::vc6 || IsGccFamily(compiler);
-}
+bool ProjectParser::KeepsRawText() const { return CompilerOf(m_project.settings->compiler).keepsRawSwitches; }
 
 std::string ProjectParser::ForConfig(std::string text, const ProjectConfig& config) const {
   ReplaceAllInPlace(text, "$(PLATFORM)", config.platform);

@@ -231,5 +231,35 @@ TEST_F(ConfigTest, WorkspaceRoot) {
   }
 }
 
+// A run that loops, and one that sets itself a bound below that and uses the other's names as plain words.
+TEST_F(ConfigTest, RunsInOneProcessDoNotMeet) {
+  const std::string loop = "@let int i = 0\n@while (i < 20) {@let i = i + 1\n}";
+  const auto load = [&](ConfigSettings& run, const std::string& name, const std::string& text) {
+    Write(name + "/app/src/" + name + ".qrpj",
+          "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"app\" qrex config { \"Debug|x64\" }\n{ \"" + name +
+              ".h\" }");
+    Write(name + "/app/" + name + ".h", text);
+    Write(name + ".qrex", "virtualTree = { \"" + name + "\" } workspaces = { \"app/src/" + name +
+                              ".qrpj\" }\n$EXPORT_LIB = \"lib\" $EXPORT_TRANSLATED_INCLUDE = \"t\"\n"
+                              "$EXPORT_UNTRANSLATED_INCLUDE = \"u\" config = \"Debug\" platform = \"x64\"\n"
+                              "translateOnly = true rebuildAll = true");
+    ASSERT_TRUE(LoadConfiguration(run, name + ".qrex", "")) << trace;
+  };
+  const auto translated = [](const std::string& name) { return Read("qrexsource/x64/Debug/app/" + name + ".h"); };
+  ConfigSettings first, second;
+  load(first, "first", "@def answer = 42\n" + loop + "int a = answer;\n");
+  load(second, "second", "int a = answer;\n");
+  second.macroWorld.limits.iterations = 10;
+  EXPECT_TRUE(RunWorkspace(second)) << trace;
+  EXPECT_TRUE(RunWorkspace(first)) << trace;
+  EXPECT_FALSE(second.macroWorld.names.MayHold("answer"));
+  EXPECT_TRUE(RunWorkspace(second)) << trace;
+  EXPECT_NE(std::string::npos, translated("first").find("int a = 42;")) << translated("first");
+  EXPECT_NE(std::string::npos, translated("second").find("int a = answer;")) << translated("second");
+  Write("second/app/second.h", loop);
+  EXPECT_FALSE(RunWorkspace(second));
+  EXPECT_NE(std::string::npos, trace.find("Too many iterations in @while directive")) << trace;
+}
+
 }  // namespace
 }  // namespace qrex

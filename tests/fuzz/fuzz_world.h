@@ -48,6 +48,8 @@ inline void EnterScratchFolder() {
   } folder;
 }
 
+constexpr ExpansionLimits kLimits = {10'000, 1 << 20};
+
 constexpr std::string_view kAppHeads =
     "$TARGET_TYPE = \"Library\" $ROOT_TO_PROJDIR = \"app\" qrex config { \"Debug|x64\" }\n";
 
@@ -58,6 +60,7 @@ struct World {
     ReplaceFile("tree/app/src/app.qrpj", std::string(kAppHeads) + std::string(appText));
     LoadConfiguration(settings, "main.qrex", "");
     settings.compiler = compiler;
+    settings.macroWorld.limits = kLimits;
     workspace = std::make_unique<Workspace>(settings);
     isLoaded = workspace->LoadProject("app/src/app.qrpj") && workspace->LoadProject("Vesk/vxObject/src/vxObject.qrpj");
   }

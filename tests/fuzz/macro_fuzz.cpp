@@ -16,9 +16,10 @@ class NoImports : public ImportHandler {
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   const std::string text(reinterpret_cast<const char*>(data), size);
   if (text.find("python") != std::string::npos) return 0;  // runs what it likes
-  expansionLimits = {10'000, 1 << 20};
   fuzz::Run([&] {
-    LSFileFrame frame;
+    MacroWorld world;
+    world.limits = fuzz::kLimits;
+    LSFileFrame frame(world);
     NoImports handler;
     SourceMap map;
     const std::string output = ExpandToStringWithMap(&handler, frame, TextRange(std::string_view(text)), 0, 0, map);

@@ -8,12 +8,12 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (size == 0) return 0;
   const std::string text(reinterpret_cast<const char*>(data) + 1, size - 1);
   if (text.find("python") != std::string::npos) return 0;
-  expansionLimits = {10'000, 1 << 20};
   fuzz::EnterScratchFolder();
   fuzz::Run([&] {
     switch (data[0] % 3) {
       case 0: {
         ConfigSettings settings;
+        settings.macroWorld.limits = fuzz::kLimits;
         if (LoadConfiguration(settings, "empty.qrex", text)) ValidateSettings(settings);
         break;
       }

@@ -7,7 +7,6 @@ using namespace qrex;
 extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   const std::string text(reinterpret_cast<const char*>(data), size);
   if (text.find("python") != std::string::npos) return 0;
-  expansionLimits = {10'000, 1 << 20};
   fuzz::Run([&] {
     fuzz::World world(CompilerKind::gcc, "{ \"t.h\" \"src\" { \"app.cpp\" } }\n");
     ReplaceFile("tree/app/t.h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);

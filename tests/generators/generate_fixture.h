@@ -48,12 +48,13 @@ class GenerateTest : public ::testing::Test, public TraceHook {
     for (const auto& loaded : workspace->projects) loaded->guid.bytes.fill(static_cast<uint8_t>(0x11 * ++digit));
   }
   void Generate() {
+    Generator generator;
     for (const auto& project : workspace->projects) {
-      GenerateProjectFile(*project, false);
-      if (project->usesQrex) GenerateProjectFile(*project, true);
+      generator.WriteProject(*project, Form::Plain);
+      if (project->usesQrex) generator.WriteProject(*project, Form::Translated);
     }
-    GenerateWorkspaceFile(*workspace, false);
-    if (AnyProjectUsesQrex(*workspace)) GenerateWorkspaceFile(*workspace, true);
+    generator.WriteWorkspace(*workspace, Form::Plain);
+    if (AnyProjectUsesQrex(*workspace)) generator.WriteWorkspace(*workspace, Form::Translated);
   }
   // tree/NAME/src/NAME.qrpj with the two heads, the configurations Debug and Release, then `statements`.
   static void AddProject(const std::string& name, const std::string& targetType, const std::string& statements) {

@@ -123,7 +123,7 @@ TEST_F(MakeFilesTest, TargetsByCompilerAndKind) {
                                                      {kClang, "CC = clang\nCXX = clang++\nAR = libtool -static\n"}};
   AddProject("lib", "Static Library", "{ }");
   for (const auto& [compiler, targetType, target, command, linkFlags] : cases) {
-    SCOPED_TRACE(std::string(CompilerKeyword(compiler)) + " " + targetType);
+    SCOPED_TRACE(std::string(CompilerOf(compiler).keyword) + " " + targetType);
     AddProject("app", targetType, "subproj { \"lib\" }\n{ }");
     settings.compiler = compiler;
     Load("app/src/app.qrpj");

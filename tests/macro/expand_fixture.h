@@ -56,7 +56,8 @@ class ExpandTest : public ::testing::Test, public ImportHandler {
   }
 
   SourceFileList sources;
-  LSFileFrame frame;
+  MacroWorld world;
+  LSFileFrame frame{world};
   std::map<std::string, std::string> files;
   std::string importPaths;
   bool takesImportPaths = true;

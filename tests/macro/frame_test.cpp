@@ -18,7 +18,8 @@ class FrameTest : public ::testing::Test {
     }
   }
 
-  LSFileFrame a, b, c, d;
+  MacroWorld world;
+  LSFileFrame a{world}, b{world}, c{world}, d{world};
 };
 
 TEST_F(FrameTest, NearerDefinitionsHide) {
@@ -48,14 +49,14 @@ TEST_F(FrameTest, ImportsThatDisagree) {
   Define(c, "x", "c");
   EXPECT_EQ("Ambiguous macro name : x", Find(a, "x"));
   EXPECT_EQ("b", Find(b, "x"));
-  LSFileFrame e;
+  LSFileFrame e(world);
   e.AddImport(b);
   EXPECT_EQ("b", Find(e, "x"));  // the nearer one, though d is in view
 }
 
 TEST_F(FrameTest, NamesEndWithTheirFrame) {
   {
-    LSFileFrame other;
+    LSFileFrame other(world);
     Define(other, "x", "other");
     Define(other, "x", "newer");
   }
@@ -148,7 +149,8 @@ TEST(SourceMapTest, Sink) {
 
 TEST(SourceMapTest, Expansions) {
   const std::string source = "x@//\n\n  m \"$(v)\" @@y @(1 + 1)\n@if (true)\n{\n  m\n  n\n}\n";
-  LSFileFrame frame;
+  MacroWorld world;
+  LSFileFrame frame(world);
   frame.AddVariable(std::make_unique<LSVar>("m", "long"));
   frame.DefineSubstitution("v", "w");
   SourceMap map;

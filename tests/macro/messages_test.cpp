@@ -77,7 +77,7 @@ TEST_F(MessagesTest, Definitions) {
       {"@def m =\n{\nx", "t(3) : Met EOS before closing }"},
       {"\n@exportdef m = 1", "t(2) : No parent frame"},
   });
-  LSFrame frame(nullptr);
+  LSFrame frame(world);
   const std::string text = "@def+ m = 1";
   try {
     ExpandToString(nullptr, frame, TextRange(std::string_view(text)));
@@ -181,23 +181,21 @@ TEST_F(MessagesTest, SelfExpansionEnds) {
 }
 
 TEST_F(MessagesTest, EndlessLoopEnds) {
-  const int64_t bound = std::exchange(expansionLimits.iterations, 1000);
+  world.limits.iterations = 1000;
   EXPECT_EQ("1000", Expand("@let int i = 0\n@while (i < 1000) {@let i = i + 1\n}i"));
   EXPECT_EQ("t(1) : Too many iterations in @while directive", Expand("@while (true) {}"));
-  expansionLimits.iterations = bound;
 }
 
 TEST_F(MessagesTest, MultiplyingMacrosEnd) {
-  const ExpansionLimits limits = std::exchange(expansionLimits, {1000, 10000, 1000});
+  world.limits = {1000, 10000, 1000};
   std::string doubling = "@def a0 = \"0123456789\"\n";
   for (int i = 1; i < 20; ++i) {
     const std::string inner = "a" + std::to_string(i - 1);
     doubling += "@def a" + std::to_string(i) + " = " + inner + " " + inner + "\n";
   }
   EXPECT_NE(std::string::npos, Expand(doubling + "a19").find("Too many macro expansions"));
-  expansionLimits.parts = limits.parts;
+  world.limits.parts = ExpansionLimits().parts;
   EXPECT_NE(std::string::npos, Expand(doubling + "a19").find("Expanded text is too long"));
-  expansionLimits = limits;
 }
 
 TEST_F(MessagesTest, DeepBracketsAreNoNesting) {

@@ -54,7 +54,8 @@ class MpfwParserTest : public ::testing::Test, public TraceHook {
   const std::string root;
   std::string trace;
   SourceFileList sources;
-  MpfwContext context{sources};
+  MacroWorld world;
+  MpfwContext context{sources, world};
   Parser parser{context, root};
 };
 

@@ -37,7 +37,8 @@ class PythonTest : public ::testing::Test {
   // Each call is a file of its own.
   std::string Expand(std::string_view text) {
     return TextOrError([&] {
-      LSFileFrame frame;
+      MacroWorld world;
+      LSFileFrame frame(world);
       return ExpandToString(nullptr, frame, TextRange(text));
     });
   }

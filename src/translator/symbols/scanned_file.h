@@ -95,7 +95,7 @@ class ScannedFile {
   IndexSet importClosure;       // the files that this one imports, directly or through others
   IndexSet mounted;             // those whose @import was passed: their declarations are visible
   bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
-  LSFileFrame frame;
+  LSFileFrame frame{host.Settings().context.rootFrame.World()};
   std::unique_ptr<NameSpace> rootNameSpace;
 };
 

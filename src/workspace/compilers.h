@@ -1,0 +1,190 @@
+// The compilers that a run may be for: one row each, and every question about a compiler is a field of its row. A new
+// kind is an enumerator, a row, and what is truly new about it.
+#pragma once
+
+#include <optional>
+#include <string>
+#include <string_view>
+
+namespace qrex {
+
+enum class CompilerKind { vc6, vc8, vc9, vc10, vc11, vc12, vc14, gcc, winegcc, clang };
+
+enum class CompilerFamily { VisualCpp, Gcc };
+enum class ProjectFormat { Dsp, Vcproj, Vcxproj, Make };
+
+struct Compiler {
+  CompilerKind kind;
+  std::string_view keyword;  // in configurations, and in the block heads of projects
+  CompilerFamily family;
+  ProjectFormat format;
+
+  // A build
+  std::string_view compile;  // both take a response file
+  std::string_view link;
+  std::string_view archive;
+  bool compilesResources = false;
+  bool embedsManifest = false;
+  std::string_view precompiledPrefix = "";  // of the name of the precompiled header
+
+  // Projects and their files
+  bool keepsRawSwitches = false;  // the text of switches is passed on; else it is read into options
+  bool keepsGuids = true;         // in projects.guids
+  std::string_view projectVersion = "";
+  std::string_view toolset = "";
+  std::string_view solutionHeader = "";  // format version and product
+  bool buildsWithMSBuild = false;        // a whole solution; else by devenv
+
+  // Make files
+  std::string_view makeTools = "";      // the lines of its variables
+  std::string_view librarySuffix = "";  // behind the name of a library that is linked
+  bool namesLibraries = false;          // by -soname
+};
+
+// By CompilerKind.
+inline constexpr Compiler kCompilers[] = {
+    {
+        .kind = CompilerKind::vc6,
+        .keyword = "vc6",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Dsp,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .precompiledPrefix = "build_",
+        .keepsRawSwitches = true,
+        .keepsGuids = false,
+    },
+    {
+        .kind = CompilerKind::vc8,
+        .keyword = "vc8",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Vcproj,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .compilesResources = true,
+        .embedsManifest = true,
+        .projectVersion = "8.00",
+        .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 9.00\n# Visual Studio 2005\n",
+    },
+    {
+        .kind = CompilerKind::vc9,
+        .keyword = "vc9",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Vcproj,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .compilesResources = true,
+        .embedsManifest = true,
+        .projectVersion = "9.00",
+        .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 10.00\n# Visual Studio 2008\n",
+    },
+    {
+        .kind = CompilerKind::vc10,
+        .keyword = "vc10",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Vcxproj,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .compilesResources = true,
+        .embedsManifest = true,
+        .projectVersion = "4.0",
+        .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 11.00\n# Visual Studio 2010\n",
+        .buildsWithMSBuild = true,
+    },
+    {
+        .kind = CompilerKind::vc11,
+        .keyword = "vc11",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Vcxproj,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .compilesResources = true,
+        .embedsManifest = true,
+        .projectVersion = "4.0",
+        .toolset = "v110",
+        .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2012\n",
+        .buildsWithMSBuild = true,
+    },
+    {
+        .kind = CompilerKind::vc12,
+        .keyword = "vc12",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Vcxproj,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .compilesResources = true,
+        .embedsManifest = true,
+        .projectVersion = "12.0",
+        .toolset = "v120",
+        .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2013\n",
+        .buildsWithMSBuild = true,
+    },
+    {
+        .kind = CompilerKind::vc14,
+        .keyword = "vc14",
+        .family = CompilerFamily::VisualCpp,
+        .format = ProjectFormat::Vcxproj,
+        .compile = "cl /c",
+        .link = "link.exe",
+        .archive = "lib.exe",
+        .compilesResources = true,
+        .embedsManifest = true,
+        .projectVersion = "14.0",
+        .toolset = "v140",
+        .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2013\n",
+        .buildsWithMSBuild = true,
+    },
+    {
+        .kind = CompilerKind::gcc,
+        .keyword = "gcc",
+        .family = CompilerFamily::Gcc,
+        .format = ProjectFormat::Make,
+        .compile = "gcc-4 -c",
+        .link = "g++",
+        .archive = "ar rcs",
+        .keepsRawSwitches = true,
+        .buildsWithMSBuild = true,
+        .makeTools = "CC = gcc\nCXX = g++\nAR = ar\n",
+        .namesLibraries = true,
+    },
+    {
+        .kind = CompilerKind::winegcc,
+        .keyword = "winegcc",
+        .family = CompilerFamily::Gcc,
+        .format = ProjectFormat::Make,
+        .compile = "gcc-4 -c",
+        .link = "wineg++",
+        .archive = "ar rcs",
+        .keepsRawSwitches = true,
+        .buildsWithMSBuild = true,
+        .makeTools = "CC = winegcc\nCXX = wineg++\nRC = wrc\nAR = ar\n",
+        .librarySuffix = ".dll",
+    },
+    {
+        .kind = CompilerKind::clang,
+        .keyword = "clang",
+        .family = CompilerFamily::Gcc,
+        .format = ProjectFormat::Make,
+        .compile = "gcc-4 -c",
+        .link = "clang++",
+        .archive = "ar rcs",
+        .keepsRawSwitches = true,
+        .buildsWithMSBuild = true,
+        .makeTools = "CC = clang\nCXX = clang++\nAR = libtool -static\n",
+    },
+};
+
+constexpr const Compiler& CompilerOf(CompilerKind kind) { return kCompilers[static_cast<size_t>(kind)]; }
+constexpr bool IsVisualCpp(CompilerKind kind) { return CompilerOf(kind).family == CompilerFamily::VisualCpp; }
+constexpr bool IsGccFamily(CompilerKind kind) { return CompilerOf(kind).family == CompilerFamily::Gcc; }
+
+std::optional<CompilerKind> FindCompiler(std::string_view keyword);
+std::string CompilerWords();  // the keywords, with blanks between them
+
+}  // namespace qrex
