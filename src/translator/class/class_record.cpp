@@ -82,18 +82,16 @@ void ClassRecord::WriteDepFields() {
 }
 
 void ClassRecord::WriteMapOrSetFunctions(const ModelField& field) {
-  std::string_view code = MapOrSetIn(field.m_type);
-  if (code.empty()) return;
+  TypeView type = MapOrSetIn(field.m_type);
+  if (type.Empty()) return;
   m_out << "static const vesk::PtrMapOrSetFns " << m_name << "_" << field.m_name << "_mapOrSetfns[] = \n";
   Block rows(m_out, ";");
-  while (!code.empty()) {
-    const std::string type = TypeText(code);
-    if (static_cast<uint8_t>(code.front()) == kOpSet) {
-      m_out << "{(const vesk::XMapFns*) &vesk::IXSet::Stubs<" << type << " >::GetTable()},\n";
+  for (; !type.Empty(); type = MapOrSetIn(type.Value())) {
+    if (type.Op() == kOpSet) {
+      m_out << "{(const vesk::XMapFns*) &vesk::IXSet::Stubs<" << TypeText(type) << " >::GetTable()},\n";
       return;
     }
-    m_out << "{&vesk::IXMap::Stubs<" << type << " >::GetTable()},\n";
-    code = MapOrSetIn(MapValue(code));
+    m_out << "{&vesk::IXMap::Stubs<" << TypeText(type) << " >::GetTable()},\n";
   }
 }
 

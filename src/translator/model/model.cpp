@@ -26,14 +26,11 @@ void WriteDefaultConstructor(TextWriter& out, const ClassDef& def) {
   out << def.ModelStructName() << "()";
   bool first = true;
   for (const ModelField* field : NonDropped(def)) {
-    uint32_t decorators = 0;
-    const std::string_view type = SkipDecorators(field->m_type, *def.owner.rootNameSpace, decorators);
-    const uint8_t op = static_cast<uint8_t>(type.front());
-    const bool isScalar = op >= kOpBool && op <= kOpChar16;
-    if (!isScalar && op != kOpEnum && op != kOpPointer) continue;
+    const TypeView type = WithoutDecorators(field->m_type, *def.owner.rootNameSpace).type;
+    if (!type.IsScalar() && type.Op() != kOpEnum && type.Op() != kOpPointer) continue;
     out << (first ? " : " : ",") << field->m_name;
     first = false;
-    if (op == kOpEnum) {
+    if (type.Op() == kOpEnum) {
       out << "((" << TypeText(type) << ")0)";
     } else {
       out << "(0)";
@@ -226,7 +223,7 @@ void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place) {
     for (const ModelField* field : fields) out << "vesk::DataSourceEvict(&" << field->m_name << ");";
     out << "}\n";
   }
-  auto writeVisit = [&](std::string_view function, bool (*isVisitable)(std::string_view, NameSpace&)) {
+  auto writeVisit = [&](std::string_view function, bool (*isVisitable)(TypeView, NameSpace&)) {
     out << heading << function << "& _v) const {";
     bool any = false;
     for (const ModelField* field : fields) {
@@ -364,18 +361,10 @@ void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
   out << "return _os;\n";
 }
 
-std::string_view MapOrSetIn(std::string_view code) {
-  for (;;) {
-    code = SkipMetadata(code);
-    const uint8_t op = static_cast<uint8_t>(code.empty() ? 0 : code.front());
-    if (op >= kOpVolatile && op <= kOpOffsettable) {
-      code.remove_prefix(1);
-    } else if (op == kOpArray) {
-      code = ArrayElement(code);
-    } else {
-      return op == kOpMap || op == kOpSet ? code : std::string_view();
-    }
-  }
+TypeView MapOrSetIn(TypeView type) {
+  type = type.WithoutMetadata();
+  while (type.IsDecorator() || type.Op() == kOpArray) type = type.Inner().WithoutMetadata();
+  return type.Op() == kOpMap || type.Op() == kOpSet ? type : TypeView();
 }
 
 std::vector<MixedModelField> AllModelFields(const ClassDef& def) {

@@ -30,9 +30,9 @@ void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def);
 void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def);
 
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def);  // when `os` is unset
-// Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or an empty view.
-std::string_view MapOrSetIn(std::string_view code);
-inline bool HoldsMapOrSet(std::string_view code) { return !MapOrSetIn(code).empty(); }
+// Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or none.
+TypeView MapOrSetIn(TypeView type);
+inline bool HoldsMapOrSet(TypeView type) { return !MapOrSetIn(type).Empty(); }
 // The rows of `_modelFields`; returns their number.
 size_t WriteModelFieldRows(TextWriter& out, const ClassDef& def);
 // The fields that those rows describe: the class's own, then those of its mixins.

@@ -31,13 +31,13 @@ class AccessorWriter {
   }
 
  private:
-  void WriteField(PathElement element, std::string_view type, const std::string& name, const std::string& expression);
-  void WriteByType(std::string_view type, const std::string& name, const std::string& expression);
+  void WriteField(PathElement element, TypeView type, const std::string& name, const std::string& expression);
+  void WriteByType(TypeView type, const std::string& name, const std::string& expression);
   void WritePathFunctions(const std::string& name);
-  void WriteSet(std::string_view type, const std::string& name, const std::string& expression);
-  void WriteOffset(std::string_view type, const std::string& name, const std::string& expression);
-  void WriteVector(std::string_view element, const std::string& name, const std::string& expression);
-  void WriteKeySet(std::string_view key, const std::string& name, const std::string& expression);
+  void WriteSet(TypeView type, const std::string& name, const std::string& expression);
+  void WriteOffset(TypeView type, const std::string& name, const std::string& expression);
+  void WriteVector(TypeView element, const std::string& name, const std::string& expression);
+  void WriteKeySet(TypeView key, const std::string& name, const std::string& expression);
 
   std::string PathCall(const std::string& name) const { return "Get" + name + "Path(" + m_path.Arguments() + ")"; }
   std::string ReadBarrier(const std::string& name, const std::string& expression) const;
@@ -45,12 +45,8 @@ class AccessorWriter {
   std::string GenopCall(std::string_view function, const std::string& name, const std::string& expression,
                         std::string_view rest) const;
   // "genop_XMVector" and the like: by what the elements hold.
-  std::string VectorOperation(std::string_view verb, std::string_view element) const;
-  bool IsMovable(std::string_view type) const {
-    uint32_t decorators = 0;
-    SkipDecorators(type, m_root, decorators);
-    return (decorators & kHasMovable) != 0;
-  }
+  std::string VectorOperation(std::string_view verb, TypeView element) const;
+  bool IsMovable(TypeView type) const { return WithoutDecorators(type, m_root).Has(kHasMovable); }
 
   TextWriter& m_out;
   const ClassDef& m_model;
@@ -97,7 +93,7 @@ void AccessorWriter::WritePathFunctions(const std::string& name) {
         << "Path(_path" << comma << arguments << "); return _path; }\n";
 }
 
-void AccessorWriter::WriteField(PathElement element, std::string_view type, const std::string& name,
+void AccessorWriter::WriteField(PathElement element, TypeView type, const std::string& name,
                                 const std::string& expression) {
   m_path.Push(std::move(element));
   m_out << "\n";
@@ -111,40 +107,42 @@ void AccessorWriter::WriteField(PathElement element, std::string_view type, cons
   m_path.Pop();
 }
 
-void AccessorWriter::WriteByType(std::string_view type, const std::string& name, const std::string& expression) {
-  uint32_t decorators = 0;
-  const std::string_view code = SkipDecorators(type, m_root, decorators);
-  const uint8_t op = static_cast<uint8_t>(code.front());
-  auto writeElement = [&](PathElement element, std::string_view elementType) {
+void AccessorWriter::WriteByType(TypeView type, const std::string& name, const std::string& expression) {
+  const Undecorated undecorated = WithoutDecorators(type, m_root);
+  const TypeView inner = undecorated.type;
+  auto writeElement = [&](PathElement element, TypeView elementType) {
     const std::string index = ParameterName(m_path.ParameterCount());
     WriteField(std::move(element), elementType, name + "Element", expression + "[" + index + "]");
   };
-  if (decorators & kHasAssignable) return WriteSet(type, name, expression);
-  if (decorators & kHasOffsettable) return WriteOffset(type, name, expression);
-  if (const ClassDef* inner = ModelOfType(code, m_root)) {
-    for (size_t i = 0; i < inner->m_modelFields.size(); ++i) {
-      const ModelField& field = *inner->m_modelFields[i];
+  if (undecorated.Has(kHasAssignable)) return WriteSet(type, name, expression);
+  if (undecorated.Has(kHasOffsettable)) return WriteOffset(type, name, expression);
+  if (const ClassDef* model = ModelOfType(inner, m_root)) {
+    for (size_t i = 0; i < model->m_modelFields.size(); ++i) {
+      const ModelField& field = *model->m_modelFields[i];
       if (field.IsDropped()) continue;
       WriteField(PathElement::Constant(i), field.m_type, name + field.m_name, expression + "." + field.m_name);
     }
     return;
   }
-  if (IsVectorLike(op)) return WriteVector(VectorElement(code), name, expression);
-  switch (op) {
+  if (IsVectorLike(inner)) {
+    const TypeCode element = VectorElement(inner);
+    return WriteVector(element, name, expression);
+  }
+  switch (inner.Op()) {
     case kOpArray:
-      return writeElement(PathElement::Index(ArraySize(code)), ArrayElement(code));
+      return writeElement(PathElement::Index(inner.Count()), inner.Inner());
     case kOpDynArray:
-      return writeElement(PathElement::Index(-1), code.substr(1));
+      return writeElement(PathElement::Index(-1), inner.Inner());
     case kOpMap:
-      return writeElement(PathElement::Key(MapKey(code)), MapValue(code));
+      return writeElement(PathElement::Key(inner.Key()), inner.Value());
     case kOpSet:
-      return WriteKeySet(code.substr(1), name, expression);
+      return WriteKeySet(inner.Inner(), name, expression);
     default:
       return WriteSet(type, name, expression);
   }
 }
 
-void AccessorWriter::WriteSet(std::string_view type, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
   const std::string parameters = m_path.Parameters();
   if (!m_operations) {
     WriteText(m_out, "$0& Write$1($2) { $3 return $4; }\n",
@@ -162,7 +160,7 @@ void AccessorWriter::WriteSet(std::string_view type, const std::string& name, co
   m_out << " }\n";
 }
 
-void AccessorWriter::WriteOffset(std::string_view type, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteOffset(TypeView type, const std::string& name, const std::string& expression) {
   m_out << "void Offset" << name << "(" << WithComma(m_path.Parameters()) << ConstReferenceText(type, "_v") << ") { ";
   if (m_operations) {
     m_out << GenopCall("genop_OffsetValue", name, expression, ",_v);");
@@ -172,13 +170,13 @@ void AccessorWriter::WriteOffset(std::string_view type, const std::string& name,
   m_out << " }\n";
 }
 
-std::string AccessorWriter::VectorOperation(std::string_view verb, std::string_view element) const {
+std::string AccessorWriter::VectorOperation(std::string_view verb, TypeView element) const {
   const std::string function = "genop_" + std::string(verb);
   if (IsMovable(element)) return function + "MVector";
   return function + (NeedsVisitPrefs(element, m_root) ? "Vector_VisitPrefs" : "Vector");
 }
 
-void AccessorWriter::WriteVector(std::string_view element, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteVector(TypeView element, const std::string& name, const std::string& expression) {
   const std::string parameters = WithComma(m_path.Parameters());
   WriteText(m_out, "void CreateInto$0($1vesk::ssize_t _i,$2 const* _src,vesk::ssize_t _n)\n",
             {name, parameters, TypeText(element)});
@@ -199,7 +197,7 @@ void AccessorWriter::WriteVector(std::string_view element, const std::string& na
   }
 }
 
-void AccessorWriter::WriteKeySet(std::string_view key, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const std::string& expression) {
   if (IsMovable(key) && m_operations) {
     const std::string parameters = WithComma(m_path.Parameters());
     for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {

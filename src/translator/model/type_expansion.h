@@ -18,6 +18,6 @@ enum class Expansion {
 
 // Why a type can't be expanded ("$model Node contains itself"); empty when it can. `self`: the class whose model is
 // just being read or expanded, or null.
-std::string ExpansionFault(std::string_view type, NameSpace& root, Expansion expansion, const ClassDef* self);
+std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self);
 
 }  // namespace qrex

@@ -144,10 +144,9 @@ std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::st
   return name + " = " + code.TextTo(end);
 }
 
-std::string_view PassingSuffix(std::string_view type) {
-  const std::string_view code = SkipMetadata(type);
-  const uint8_t op = code.empty() ? 0 : static_cast<uint8_t>(code.front());
-  return (op >= kOpBool && op <= kOpChar16) || op == kOpPointer ? "" : " const&";
+std::string_view PassingSuffix(TypeView type) {
+  type = type.WithoutMetadata();
+  return type.IsScalar() || type.Op() == kOpPointer ? "" : " const&";
 }
 
 NodeHead ReadNodeHead(QrexParser& parser, const ClassDef& def) {

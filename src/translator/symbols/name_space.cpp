@@ -87,7 +87,7 @@ const Symbol* SymbolIndex::Find(std::string_view key) const {
 // --- Name spaces
 
 NameSpace::NameSpace(ScannedFile& owner, NameSpace* parent, std::string name)
-    : NameSpaceElement(owner, nullptr, Category::NameSpace),
+    : NameSpaceElement(owner, nullptr, DeclKind::NameSpace),
       m_keyPrefix(parent ? parent->m_keyPrefix + name + "::" : std::string()) {
   this->name = std::move(name);
   this->parent = parent;

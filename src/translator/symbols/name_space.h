@@ -17,14 +17,13 @@
 
 #include "text/index_set.h"
 #include "text/text_writer.h"
+#include "translator/symbols/declaration_kinds.h"
 
 namespace qrex {
 
 class NameSpace;
 class ScannedFile;
 
-enum class Category { Typedef, Interface, Class, NameSpace, Functor, GlobalFunction, GlobalVar, Variant, Enum };
-enum class TraitsKind { Other, Struct, Class, Adt, Model, Interface, Functor, Variant, Enum };
 enum class DeclStatus { Forward, Deferred, Defined };
 
 // The names that a file registers and unregisters, qualified.
@@ -35,20 +34,20 @@ struct RegistrationLists {
 
 class NameSpaceElement {
  public:
-  NameSpaceElement(ScannedFile& owner, const char* position, Category category)
-      : owner(owner), position(position), category(category) {}
+  NameSpaceElement(ScannedFile& owner, const char* position, DeclKind kind)
+      : owner(owner), position(position), kindTraits(TraitsOf(kind)), category(kindTraits.category) {}
   virtual ~NameSpaceElement() = default;
   NameSpaceElement(const NameSpaceElement&) = delete;
   NameSpaceElement& operator=(const NameSpaceElement&) = delete;
 
-  virtual std::string_view GetKeyword() const = 0;            // the word behind `$`
-  virtual std::string_view GetReflectedKindName() const = 0;  // suffix of RegisterReflected
+  std::string_view GetKeyword() const { return kindTraits.keyword; }           // the word behind `$`
+  std::string_view GetReflectedKindName() const { return kindTraits.record; }  // suffix of RegisterReflected
   virtual bool HaveSomethingToRegister() const = 0;
   virtual bool HasRecord() const { return m_reflected; }
   virtual void WriteReflectedDefinition(TextWriter& out) = 0;  // the record
   // The element's text in the reflection tail (emit/records.h).
   virtual void WriteReflection(TextWriter& out, RegistrationLists& lists) = 0;
-  virtual DeclStatus GetDeclStatus() const = 0;
+  DeclStatus GetDeclStatus() const { return status; }
   virtual bool EffectivelyRegistered() const { return m_registered; }
   virtual void CollectReferences(std::vector<const NameSpaceElement*>& out) const = 0;  // appends
   virtual bool ContainsMetaData() const { return !metadata.empty(); }
@@ -64,8 +63,8 @@ class NameSpaceElement {
   std::string name;
   std::string metadata;  // an encoded list, often empty
   NameSpace* parent = nullptr;
-  Category category;
-  TraitsKind traitsKind = TraitsKind::Other;
+  const KindTraits& kindTraits;
+  const Category category;
   DeclStatus status = DeclStatus::Forward;
   bool m_exported = false;
   bool m_reflected = false;
@@ -116,12 +115,9 @@ class NameSpace : public NameSpaceElement {
  public:
   NameSpace(ScannedFile& owner, NameSpace* parent, std::string name);  // a root has no parent and an empty name
 
-  std::string_view GetKeyword() const override { return "namespace"; }
-  std::string_view GetReflectedKindName() const override { return {}; }
   bool HaveSomethingToRegister() const override;
   void WriteReflectedDefinition(TextWriter&) override {}
   void WriteReflection(TextWriter& out, RegistrationLists& lists) override;  // each element, in map order
-  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
   bool ContainsMetaData() const override { return false; }
 
