@@ -23,7 +23,7 @@ void ParseItem(QrexParser& parser, ClassDef& def) {
   for (const ClassKeyword& keyword : parser.Keywords().classLevel) {
     if (!parser.Is(keyword.word)) continue;
     keyword.parse(parser, def);
-    if (!keyword.advancesItself) parser.Advance();
+    if (keyword.endsOn == EndsOn::LastToken) parser.Advance();
     return;
   }
   ParseFieldOrMethod(parser, def);

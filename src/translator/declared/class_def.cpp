@@ -38,7 +38,7 @@ bool ClassDef::HaveSomethingToRegister() const {
          (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
 }
 
-// What the record names, in its order: the fields of the mixins stand in it behind the class's own.
+// In the order of the record: the fields of mixins follow the class's own.
 void ClassDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
   std::vector<const ClassDef*> sources = {this};
   sources.insert(sources.end(), m_mixins.begin(), m_mixins.end());
@@ -102,8 +102,8 @@ bool ClassDef::HasSerialise() const {
 
 bool ClassDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
 
-// A model may hold containers of its own class: while the answer is worked out, it counts as no. The traits may ask
-// ahead of a body that brings the model.
+// Recursion guard: while being computed the answer is false, since a model may contain containers of its own class. Not
+// cached before the body is read, since traits may be written earlier.
 bool ClassDef::AnyModelField(bool (*test)(TypeView, NameSpace&), TriState& cache) const {
   if (cache == TriState::Unset && HasEmbeddedModel()) {
     cache = TriState::Off;
@@ -150,7 +150,7 @@ bool ClassDef::CanSerialiseEmbeddedModel() const {
     });
     m_canSerialiseModel = can ? Memo::Yes : Memo::No;
   }
-  return m_canSerialiseModel != Memo::No;  // a model that holds itself in a container doesn't stand in its own way
+  return m_canSerialiseModel != Memo::No;  // a model that contains itself in a container is no obstacle to itself
 }
 
 bool ClassDef::WriteInsertionExtractionInTermsOfSerialise() const {

@@ -20,6 +20,8 @@ class InterfaceDef;
 enum class ClassKind { Struct, Class, Adt, Mixin, Model };
 std::string_view KeywordOf(ClassKind kind);
 
+enum class Placement { InClass, OutOfClass };
+
 struct ModelField {
   std::string m_name;
   TypeCode m_type;
@@ -47,6 +49,8 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   bool IsPureModel() const { return kind == ClassKind::Model; }
   bool IsUnderlyingStruct() const { return kind != ClassKind::Class; }
   bool IsTemplate() const { return !m_templateArgList.empty(); }
+  // Where its generated members are defined; what depends on template parameters stays in the class.
+  Placement MemberPlacement() const { return IsMixin() || IsTemplate() ? Placement::InClass : Placement::OutOfClass; }
   bool ExternalDefinition() const { return qualifiers.extern_ == TriState::On; }
   bool WriteTraits() const { return qualifiers.traits != TriState::Off && !m_nested && !IsTemplate(); }
   std::string_view StructWord() const { return IsUnderlyingStruct() ? "struct " : "class "; }

@@ -66,7 +66,7 @@ class Dispatch {
     m_out << "default: vxAssertUnreachable();\n}\n";
   }
 
-  // Of the overload for the items that the levels stand at.
+  // Of the overload for the current item of each level.
   void WriteCall() {
     m_out << (m_isVoid ? "" : "return ") << m_def.name << "(";
     auto level = m_levels.begin();

@@ -178,7 +178,7 @@ class VariantTail {
   }
 
  private:
-  // switch(_tag) over the items; what `writeCase` writes for each stands behind "case N : ".
+  // switch(_tag) over the items; `writeCase` writes what follows "case N : ".
   void WriteSwitch(const std::function<std::string(const VariantItem&)>& composeCase, std::string_view last = {}) {
     m_out << "switch(_tag)\n";
     Block cases(m_out);

@@ -59,8 +59,13 @@ void AttributeWriter::WriteStruct(const std::string& className, TypeView type, c
   m_out << "struct\n{\n";
   {
     IndentScope indent(m_out, 4);
-    WriteOperators({className, 0, "ATTRIB_CAST" + arguments, "CONST_ATTRIB_CAST" + arguments, attributeName,
-                    accessorName, memberName, false, readOnly},
+    WriteOperators({.className = className,
+                    .self = "ATTRIB_CAST" + arguments,
+                    .constSelf = "CONST_ATTRIB_CAST" + arguments,
+                    .attribute = attributeName,
+                    .accessor = accessorName,
+                    .member = memberName,
+                    .readOnly = readOnly},
                    type);
   }
   m_out << "} " << memberName << ";\n";
@@ -96,12 +101,13 @@ void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
 
 void AttributeWriter::WriteConversions(const Scope& scope, std::string_view typeText, bool isOffsettable) {
   const std::string key = scope.Key();
-  WriteText(m_out, "operator $0$1() const { return $2->Get$3($4); }\n",
-            {typeText, m_byValue || isOffsettable ? "" : " const&", scope.constSelf, scope.accessor, key});
-  if (m_byValue) return;
+  WriteText(
+      m_out, "operator $0$1() const { return $2->Get$3($4); }\n",
+      {typeText, m_access == Access::Methods || isOffsettable ? "" : " const&", scope.constSelf, scope.accessor, key});
+  if (m_access == Access::Methods) return;
   WriteText(m_out, "$0 const& read() const { return $1->Get$2($3); }\n",
             {typeText, scope.constSelf, scope.accessor, key});
-  if (m_hasWrite) {
+  if (m_access == Access::Barriers) {
     WriteText(m_out, "$0 & write() { return $1->Write$2($3); }\n", {typeText, scope.self, scope.accessor, key});
   }
   WriteText(m_out,
@@ -204,7 +210,15 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
     if (NeedsForwarders(WithoutDecorators(elementType, m_root).type.Op())) {
       WriteForwarders(scope.depth, scope.depth, elementType, proxy, scope.readOnly);
     }
-    WriteOperators({proxy, scope.depth + 1, "_self", "_self", "", proxy, proxy, true, scope.readOnly}, elementType);
+    WriteOperators({.className = proxy,
+                    .depth = scope.depth + 1,
+                    .self = "_self",
+                    .constSelf = "_self",
+                    .accessor = proxy,
+                    .member = proxy,
+                    .inProxy = true,
+                    .readOnly = scope.readOnly},
+                   elementType);
     WriteText(m_out, "$0* _self;\n$1 $2;\n", {scope.className, keyType, index});
   }
   m_out << "};\n";

@@ -12,16 +12,23 @@
 
 namespace qrex {
 
-// --- What accessors and attribute structs ask of a type; `type` stands behind metadata, typedefs and decorators.
+// --- What accessors and attribute structs ask of a type; `type` has no metadata, typedef or decorator at its head.
 bool IsVectorLike(TypeView type);
 TypeCode VectorElement(TypeView type);                        // of a vector or a string
 const ClassDef* ModelOfType(TypeView type, NameSpace& root);  // a class of kind model; or null
 
+// What generated code goes through to get at a field or an attribute.
+enum class Access {
+  Struct,      // the field itself, in the struct that holds it
+  Barriers,    // the field, behind a read or write barrier
+  Operations,  // the genop_ functions of the runtime
+  Methods      // the methods of an interface, which return by value
+};
+
 class AttributeWriter {
  public:
-  // `byValue`: the accessors behind the struct answer by value; `hasWrite`: they include Write.
-  AttributeWriter(TextWriter& out, NameSpace& root, bool byValue, bool hasWrite)
-      : m_out(out), m_root(root), m_byValue(byValue), m_hasWrite(hasWrite) {}
+  // `access`: of the accessors that the operators call.
+  AttributeWriter(TextWriter& out, NameSpace& root, Access access) : m_out(out), m_root(root), m_access(access) {}
 
   void WriteStruct(const std::string& className, TypeView type, const std::string& attributeName,
                    const std::string& accessorName, const std::string& memberName, bool readOnly);
@@ -31,10 +38,10 @@ class AttributeWriter {
   struct Scope {
     std::string className;
     size_t depth = 0;
-    std::string self, constSelf;
-    std::string attribute;
-    std::string accessor;
-    std::string member;
+    std::string self = {}, constSelf = {};
+    std::string attribute = {};
+    std::string accessor = {};
+    std::string member = {};
     bool inProxy = false;
     bool readOnly = false;
     std::string Key() const { return inProxy ? ParameterName(depth - 1) : std::string(); }
@@ -57,8 +64,7 @@ class AttributeWriter {
   TextWriter& m_out;
   NameSpace& m_root;
   FieldPath m_path;  // indexes and keys only
-  const bool m_byValue;
-  const bool m_hasWrite;
+  const Access m_access;
 };
 
 }  // namespace qrex

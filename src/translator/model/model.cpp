@@ -107,8 +107,8 @@ void WriteStructMembers(TextWriter& out, const ClassDef& def) {
     out << "void Serialise(vesk::Archive&) const;\n"
            "void Deserialise(vesk::InputArchive&);\n";
   }
-  if (def.IsMixin() || def.IsTemplate() || def.m_isAnonymous) {
-    WriteVisiting(out, def, TextPlace::Inline);
+  if (def.MemberPlacement() == Placement::InClass || def.m_isAnonymous) {
+    WriteVisiting(out, def, Placement::InClass);
   } else {
     WriteVisitingDeclarations(out, def);
   }
@@ -137,9 +137,9 @@ void WriteModelFieldsAndAccessors(TextWriter& out, const ClassDef& def) {
 
 // --- Archives
 
-void WriteSerialise(TextWriter& out, const ClassDef& def, TextPlace place) {
+void WriteSerialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
-  if (place == TextPlace::Inline) {
+  if (placement == Placement::InClass) {
     out << "template<typename Archive> void Serialise(Archive& _ar) const\n";
   } else {
     out << "void " << ModelScope(def) << "::Serialise(vesk::Archive& _ar) const\n";
@@ -191,10 +191,10 @@ void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& 
 
 }  // namespace
 
-void WriteDeserialise(TextWriter& out, const ClassDef& def, TextPlace place) {
+void WriteDeserialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
   out << "void ";
-  if (place == TextPlace::OutOfLine) out << ModelScope(def) << "::";
+  if (placement == Placement::OutOfClass) out << ModelScope(def) << "::";
   out << "Deserialise(vesk::InputArchive& _ar)\n";
   Block body(out);
   if (def.m_numModelSchema < 2) {
@@ -211,11 +211,11 @@ void WriteDeserialise(TextWriter& out, const ClassDef& def, TextPlace place) {
 
 // --- Visiting
 
-void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place) {
+void WriteVisiting(TextWriter& out, const ClassDef& def, Placement placement) {
   NameSpace& root = *def.owner.rootNameSpace;
   const auto fields = NonDropped(def);
   std::string heading = "void ";
-  if (place == TextPlace::OutOfLine) {
+  if (placement == Placement::OutOfClass) {
     heading = def.TemplatePrefix() + "void " + ModelScope(def) + def.TemplateArgs() + "::";
   }
   if (!def.GenerateOps()) {
@@ -250,6 +250,7 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
   const std::string mixin = def.name + "_model_mixin";
   const std::string type = model.QualifiedModelStructName() + model.TemplateArgs();
   const bool operations = def.GenerateOps() && model.qualifiers.genop != TriState::Off;
+  const Access access = operations ? Access::Operations : Access::Barriers;
   out << "template <typename BC" << (def.IsTemplate() ? "," + def.m_templateArgList : "") << ">\n";
   out << "struct " << mixin << " : public BC\n";
   Block body(out, ";");
@@ -265,11 +266,11 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
       << "}\n";
   out << "void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}\n"
          "void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}\n";
-  WriteModelMixinAccessors(out, def, model, operations);
+  WriteModelMixinAccessors(out, def, model, access);
   if (model.GetNumNonDroppedModelFields() > 0) {
     out << "union\n";
     Block attributes(out, ";");
-    WriteModelMixinAttributeStructs(out, def, model, operations);
+    WriteModelMixinAttributeStructs(out, def, model, access);
   }
   WriteText(out,
             "typedef $0 model_type;\n"
@@ -300,7 +301,7 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
 namespace {
 
 bool KeepsDataSourceRsn(const ClassDef& def) {
-  if (def.IsMixin() || def.IsTemplate()) return false;
+  if (def.MemberPlacement() == Placement::InClass) return false;
   return (def.m_inheritsModel && def.CanSerialiseEmbeddedModel()) ||
          (def.m_referencedModel && def.m_referencedModel->CanSerialiseEmbeddedModel());
 }

@@ -13,20 +13,19 @@ namespace {
 // barrier and touch the field.
 class AccessorWriter {
  public:
-  AccessorWriter(TextWriter& out, const ClassDef& model, bool operations, bool implementsIObject, bool structMode)
+  AccessorWriter(TextWriter& out, const ClassDef& model, Access access, bool implementsIObject)
       : m_out(out),
         m_model(model),
         m_root(*model.owner.rootNameSpace),
-        m_operations(operations),
-        m_implementsIObject(implementsIObject),
-        m_barriers(!structMode),
-        m_structMode(structMode) {}
+        m_access(access),
+        m_implementsIObject(implementsIObject) {}
 
   void Write() {
     for (size_t i = 0; i < m_model.m_modelFields.size(); ++i) {
       const ModelField& field = *m_model.m_modelFields[i];
       if (field.IsDropped()) continue;
-      WriteField(PathElement::Constant(i), field.m_type, field.m_name, (m_structMode ? "" : "_model_.") + field.m_name);
+      WriteField(PathElement::Constant(i), field.m_type, field.m_name,
+                 (m_access == Access::Struct ? "" : "_model_.") + field.m_name);
     }
   }
 
@@ -52,18 +51,16 @@ class AccessorWriter {
   const ClassDef& m_model;
   NameSpace& m_root;
   FieldPath m_path;
-  const bool m_operations;
+  const Access m_access;
   const bool m_implementsIObject;
-  const bool m_barriers;
-  const bool m_structMode;
 };
 
 constexpr std::string_view kConstFinal = "static_cast<const typename BC::FinalClass*>(this)";
 constexpr std::string_view kFinal = "static_cast<typename BC::FinalClass*>(this)";
 
 std::string AccessorWriter::ReadBarrier(const std::string& name, const std::string& expression) const {
-  if (!m_barriers) return {};
-  if (m_operations) {
+  if (m_access == Access::Struct) return {};
+  if (m_access == Access::Operations) {
     return "vesk::IndepFieldReadBarrier(" + std::string(kConstFinal) + "," + PathCall(name) + "); ";
   }
   return "vesk::DataSourceReadBarrier(&" + expression + "," +
@@ -72,7 +69,7 @@ std::string AccessorWriter::ReadBarrier(const std::string& name, const std::stri
 }
 
 std::string AccessorWriter::WriteBarrier(const std::string& expression) const {
-  if (!m_barriers || m_operations) return {};
+  if (m_access != Access::Barriers) return {};
   return "vesk::DataSourceWriteBarrier(&" + expression + "," +
          std::string(m_implementsIObject ? kFinal : "vesk::null") + ",\"" + m_model.name + "::" + expression + "\"); ";
 }
@@ -144,12 +141,12 @@ void AccessorWriter::WriteByType(TypeView type, const std::string& name, const s
 
 void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
   const std::string parameters = m_path.Parameters();
-  if (!m_operations) {
+  if (m_access != Access::Operations) {
     WriteText(m_out, "$0& Write$1($2) { $3 return $4; }\n",
               {TypeText(type), name, parameters, WriteBarrier(expression), expression});
   }
   m_out << "void Set" << name << "(" << WithComma(parameters) << ConstReferenceText(type, "_v") << ") { ";
-  if (m_operations) {
+  if (m_access == Access::Operations) {
     const std::string_view function = IsMovable(type)                 ? "genop_AssignPref"
                                       : NeedsVisitPrefs(type, m_root) ? "genop_Assign_VisitPrefs"
                                                                       : "genop_Assign";
@@ -162,7 +159,7 @@ void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std:
 
 void AccessorWriter::WriteOffset(TypeView type, const std::string& name, const std::string& expression) {
   m_out << "void Offset" << name << "(" << WithComma(m_path.Parameters()) << ConstReferenceText(type, "_v") << ") { ";
-  if (m_operations) {
+  if (m_access == Access::Operations) {
     m_out << GenopCall("genop_OffsetValue", name, expression, ",_v);");
   } else {
     m_out << WriteBarrier(expression) << expression << " += _v;";
@@ -182,7 +179,7 @@ void AccessorWriter::WriteVector(TypeView element, const std::string& name, cons
             {name, parameters, TypeText(element)});
   {
     Block body(m_out);
-    if (m_operations) {
+    if (m_access == Access::Operations) {
       m_out << GenopCall(VectorOperation("CreateInto", element), name, expression, ",_i,_src,_n);\n");
     } else {
       WriteText(m_out, "$0$1.insert($1.begin()+_i,_src,_src+_n);\n", {WriteBarrier(expression), expression});
@@ -190,7 +187,7 @@ void AccessorWriter::WriteVector(TypeView element, const std::string& name, cons
   }
   WriteText(m_out, "void DeleteFrom$0($1vesk::ssize_t _i1,vesk::ssize_t _i2)\n", {name, parameters});
   Block body(m_out);
-  if (m_operations) {
+  if (m_access == Access::Operations) {
     m_out << GenopCall(VectorOperation("DeleteFrom", element), name, expression, ",_i1,_i2);\n");
   } else {
     WriteText(m_out, "$0$1.erase(_i1,_i2-_i1);\n", {WriteBarrier(expression), expression});
@@ -198,7 +195,7 @@ void AccessorWriter::WriteVector(TypeView element, const std::string& name, cons
 }
 
 void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const std::string& expression) {
-  if (IsMovable(key) && m_operations) {
+  if (IsMovable(key) && m_access == Access::Operations) {
     const std::string parameters = WithComma(m_path.Parameters());
     for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {
       WriteText(m_out, "bool $0$1($2$3 const& _v) { return $4 }\n",
@@ -213,7 +210,7 @@ void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const st
   WritePathFunctions(element);
   auto write = [&](std::string_view verb, std::string_view operation, std::string_view member) {
     WriteText(m_out, "bool $0$1($2) { ", {verb, name, m_path.Parameters()});
-    if (m_operations) {
+    if (m_access == Access::Operations) {
       m_out << "return " << GenopCall(operation, element, expression, "," + index + ");");
     } else {
       WriteText(m_out, "$0return $1.$2($3);", {WriteBarrier(expression), expression, member, index});
@@ -228,17 +225,17 @@ void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const st
 }  // namespace
 
 void WriteModelStructAccessors(TextWriter& out, const ClassDef& def) {
-  AccessorWriter(out, def, false, def.m_implementsIObject, true).Write();
+  AccessorWriter(out, def, Access::Struct, def.m_implementsIObject).Write();
 }
 
-void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, bool operations) {
-  AccessorWriter(out, model, operations, def.m_implementsIObject, false).Write();
+void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
+  AccessorWriter(out, model, access, def.m_implementsIObject).Write();
 }
 
-void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, bool operations) {
+void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
   for (const ModelField* field : model.m_modelFields) {
     if (field->IsDropped()) continue;
-    AttributeWriter writer(out, *model.owner.rootNameSpace, false, !operations);
+    AttributeWriter writer(out, *model.owner.rootNameSpace, access);
     writer.WriteStruct(def.name + "_model_mixin", field->m_type, field->m_name, field->m_name, field->m_name, false);
   }
 }

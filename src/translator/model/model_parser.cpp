@@ -266,7 +266,7 @@ void ModelBlock::ParseEvolveEntry(std::vector<Evolution>& evolutions) {
   m_parser.Advance();
 }
 
-// Behind the `(`; stands behind the `)` afterwards.
+// The current token is behind the `(`, afterwards behind the `)`.
 void ModelBlock::ParseEvolveArguments(ModelField& field, Evolution& evolution) {
   if (m_parser.Accept(kCloseParen)) return;
   for (;;) {

@@ -1,5 +1,5 @@
 // How far generated text follows a type: into the fields of models, and on into the elements of containers. The text
-// that comes of it is finite only where the way never leads back to a model that it passed.
+// is finite only if no model is reached again from within itself.
 #pragma once
 
 #include <string>

@@ -22,7 +22,7 @@ std::string ReadBraceContent(QrexParser& parser, const ClassDef& def);
 // By value are numbers, characters and pointers; " const&" for all other types.
 std::string_view PassingSuffix(TypeView type);
 
-// What stands ahead of a cached or dependent declaration: `-`, `^`.
+// The marks before a cached or dependent declaration: `-`, `^`.
 struct NodeHead {
   bool reflected = false;
   bool hard = false;

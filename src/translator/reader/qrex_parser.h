@@ -115,7 +115,7 @@ class QrexParser : public ExpressionParser {
   [[noreturn]] void FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element);
   // Into the current name space, or into the class that encloses it.
   void Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* enclosing);
-  // A forward declaration stands in the current name space, also from a class body, unless a thing of its name does
+  // Enters a forward declaration into the current name space, also from a class body, unless its name is known there
   // already. `old` is what the look-up of one that is not nested found.
   void EnterForward(std::unique_ptr<NameSpaceElement> element, const NameSpaceElement* old, const ClassDef* enclosing);
   void RequireSemicolonAfter(const NameSpaceElement& element);  // "; expected after definition of ..."

@@ -52,9 +52,13 @@ std::optional<TypeCode> QrexParser::ParseDecoratorType(bool reflected) {
   TypeCode type;
   for (uint8_t op = kOpVoid; op <= kOpString16; ++op) {
     const auto builtIn = static_cast<TypeOp>(op);
-    if (!Is(BuiltInTypeName(builtIn)) && !(builtIn == kOpString8 && Is("xstring"))) continue;
+    if (!Is(BuiltInTypeName(builtIn))) continue;
     AppendOp(type, builtIn);
     Advance();
+    return type;
+  }
+  if (AcceptWord("xstring")) {
+    AppendOp(type, kOpString8);
     return type;
   }
   if (Is("xmap")) {
@@ -160,7 +164,7 @@ std::optional<ParsedType> QrexParser::ParseTypeWithName(Naming naming, bool refl
     parsed.followedByParen = Is(kOpenParen);
   }
   parsed.nameEnd = previous.text.end;
-  // Arrays stand outer dimension first; metadata that follows a dimension stands in front of its code.
+  // The outer dimension comes first in the code; metadata behind a dimension goes before that dimension's code.
   TypeCode dimensions, dimension;
   while (Is(kOpenBracket) || Is(kColon)) {
     if (Accept(kColon)) {

@@ -1,5 +1,6 @@
-// The kinds of declarations: one row for each. Whoever asks what a kind is called or how its types behave reads a
-// field; a new kind is an enumerator and a row, and the compiler finds the functions that choose by category.
+// The kinds of declarations, one row each. Code that needs the keyword, record or opcode of a kind reads a field of its
+// row. A new kind is an enumerator and a row; the switches over categories have no default, so that the compiler
+// reports each one that lacks a new category.
 #pragma once
 
 #include <cstdint>
@@ -26,7 +27,8 @@ enum class DeclKind {
   Function,
   Var,
   Variant,
-  Enum
+  Enum,
+  End  // their number
 };
 
 struct KindTraits {
@@ -56,17 +58,16 @@ inline constexpr KindTraits kDeclKinds[] = {
 
 constexpr const KindTraits& TraitsOf(DeclKind kind) { return kDeclKinds[static_cast<size_t>(kind)]; }
 
-namespace detail {
-constexpr bool RowsAreInOrder() {
-  for (size_t i = 0; i < std::size(kDeclKinds); ++i) {
-    if (kDeclKinds[i].kind != static_cast<DeclKind>(i)) return false;
-  }
-  return kDeclKinds[std::size(kDeclKinds) - 1].kind == DeclKind::Enum;  // the last one
-}
-}  // namespace detail
-static_assert(detail::RowsAreInOrder(), "a row for each DeclKind, in its order");
+static_assert(
+    [] {
+      for (size_t i = 0; i < std::size(kDeclKinds); ++i) {
+        if (kDeclKinds[i].kind != static_cast<DeclKind>(i)) return false;
+      }
+      return std::size(kDeclKinds) == static_cast<size_t>(DeclKind::End);
+    }(),
+    "a row for each DeclKind, in its order");
 
-// The category that an opcode of a named type stands for; the op must be that of a declaration.
+// The category of what a named type refers to; NameSpace for kOpCppText, which is no declaration.
 constexpr Category CategoryOf(TypeOp op) {
   for (const KindTraits& row : kDeclKinds) {
     if (row.op == op) return row.category;

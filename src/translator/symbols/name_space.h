@@ -3,7 +3,7 @@
 // A name space's tree is private to its file. Importing a file never copies elements: the imported files become visible
 // ("mounted"), and a name space of the same path in several files is searched as one. Because a file may see thousands
 // of others, nothing is copied per import either: one SymbolIndex per build lists the declarations of each qualified
-// name, and a look-up keeps those whose file stands in the asking file's closure, a bit set. Its cost does not grow
+// name, and a look-up keeps those whose file is in the asking file's import closure, a bit set. Its cost does not grow
 // with the number of files.
 #pragma once
 
@@ -76,9 +76,9 @@ class NameSpaceElement {
   mutable std::string m_qualifiedName;
 };
 
-// All declarations of one name in a build. What is only forward declared may stand in hundreds of files and
-// never conflicts: it is kept apart, so that a look-up reads the few declarations that say more. The status of an
-// element moves only while its own statement is read, so the newest one is sorted in when the next of its name comes.
+// All declarations of one name in a build. Forward declarations may occur in hundreds of files and never
+// conflict; they are stored separately so that look-ups scan only the few definitions. An element's status changes only
+// while its own statement is parsed, so the newest one is filed when the next of its name is entered.
 class Symbol {
  public:
   void Enter(NameSpaceElement& element);
@@ -124,13 +124,13 @@ class NameSpace : public NameSpaceElement {
   NameSpaceElement* LookupLocal(std::string_view name);  // own map, with the name spaces that imports bring
   NameSpaceElement* Lookup(std::string_view name);       // with mounted name spaces; throws "Ambiguous identifier : "
   NameSpaceElement* LookupPath(std::string_view path);   // a::b::c
-  bool Sees(std::string_view name) const;                // does anything of that name stand here; never ambiguous
+  bool Sees(std::string_view name) const;                // is anything of that name visible here; never throws
   template <typename T>
   T* LookupKind(std::string_view name, Category kind) {
     NameSpaceElement* element = Lookup(name);
     return element && element->category == kind ? static_cast<T*>(element) : nullptr;
   }
-  NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name stands for something else
+  NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name is that of another kind
   NameSpaceElement& Add(std::unique_ptr<NameSpaceElement> element);  // sets `parent`; replaces what the map had
   bool IsRoot() const { return parent == nullptr; }
   bool Empty() const { return m_elements.empty(); }

@@ -48,14 +48,14 @@ struct TypeContext {
 // The first rule for fields that the type breaks ("void not permitted here"); empty when it keeps all.
 std::string_view TypeFault(TypeView type, NameSpace& root, TypeContext context);
 
-// What stands behind a typedef: TypedefDef derives from this as well.
+// The target of a typedef; implemented by TypedefDef.
 class TypedefTarget {
  public:
   virtual ~TypedefTarget() = default;
   virtual const TypeCode& TargetType() const = 0;
 };
 
-// What IsSerialisable and the visit predicates ask of a class or variant: both derive from this as well.
+// What IsSerialisable and the visit predicates ask of a class or variant; implemented by both.
 class TypeBehaviour {
  public:
   virtual ~TypeBehaviour() = default;
