@@ -379,19 +379,19 @@ void QrexParser::ParseMetadataValue(std::string& out) {
   ParseExpression(value);
   switch (value.kind) {
     case LiteralKind::Bool:
-      AppendMetadata(out, value.boolean);
+      AppendMetadataBool(out, value.boolean);
       break;
     case LiteralKind::Int64:
       if (value.integer < std::numeric_limits<int32_t>::min() || value.integer > std::numeric_limits<int32_t>::max()) {
         Fail("64-bit integer metadata not supported");
       }
-      AppendMetadata(out, static_cast<int32_t>(value.integer));
+      AppendMetadataInt(out, static_cast<int32_t>(value.integer));
       break;
     case LiteralKind::Float64:
-      AppendMetadata(out, value.real);
+      AppendMetadataFloat(out, value.real);
       break;
     case LiteralKind::String:
-      AppendMetadata(out, std::string_view(value.text));
+      AppendMetadataString(out, value.text);
       break;
     default:
       Fail("unsupported literal: " + Printed(current));

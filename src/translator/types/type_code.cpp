@@ -47,24 +47,24 @@ void AppendNamedType(TypeCode& code, TypeOp op, std::string_view name) {
 
 // --- Metadata
 
-void AppendMetadata(std::string& out, bool value) {
+void AppendMetadataBool(std::string& out, bool value) {
   AppendOp(out, kOpMetaBool);
   AppendByte(out, value);
 }
 
-void AppendMetadata(std::string& out, int32_t value) {
+void AppendMetadataInt(std::string& out, int32_t value) {
   AppendOp(out, kOpMetaInt);
   AppendLittleEndian(out, static_cast<uint32_t>(value));
 }
 
-void AppendMetadata(std::string& out, double value) {
+void AppendMetadataFloat(std::string& out, double value) {
   uint64_t bits;
   std::memcpy(&bits, &value, sizeof bits);
   AppendOp(out, kOpMetaFloat);
   AppendLittleEndian(out, bits);
 }
 
-void AppendMetadata(std::string& out, std::string_view value) {
+void AppendMetadataString(std::string& out, std::string_view value) {
   AppendOp(out, kOpMetaString);
   AppendCompactString(out, value);
 }

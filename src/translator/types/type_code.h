@@ -74,7 +74,7 @@ struct FunctionArg {
   std::string name;
   TypeCode type;
   std::string defaultValue;  // source text behind `=`
-  bool polymorphic = false;  // stood in [ ]
+  bool polymorphic = false;  // was written in [ ]
 };
 
 struct FunctionSignature {
@@ -97,10 +97,10 @@ void AppendNamedType(TypeCode& code, TypeOp op, std::string_view name);
 
 // --- Metadata: values of their own, or ahead of the type that they apply to
 inline constexpr size_t kMaxMetadataValues = 31;  // of a list or a functor
-void AppendMetadata(std::string& out, bool value);
-void AppendMetadata(std::string& out, int32_t value);
-void AppendMetadata(std::string& out, double value);
-void AppendMetadata(std::string& out, std::string_view value);
+void AppendMetadataBool(std::string& out, bool value);
+void AppendMetadataInt(std::string& out, int32_t value);
+void AppendMetadataFloat(std::string& out, double value);
+void AppendMetadataString(std::string& out, std::string_view value);
 void AppendMetadataList(std::string& out, size_t count, std::string_view values);
 void AppendMetadataFunctor(std::string& out, std::string_view name, size_t count, std::string_view values);
 std::string_view SkipMetadataValue(std::string_view code);  // what stands behind the value at the head
