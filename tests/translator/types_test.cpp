@@ -50,9 +50,8 @@ class TypesTest : public TranslateTest {
 
   TypeCode CodeOf(const std::string& text, bool reflected = true) {
     TypeCode code;
-    std::string name;
     EXPECT_EQ("", Parse(text, [&](QrexParser& parser) {
-                EXPECT_TRUE(parser.ParseTypeWithName(code, &name, false, nullptr, reflected)) << text;
+                code = parser.ParseTypeWithName(Naming::Optional, reflected).value().type;
                 EXPECT_TRUE(parser.Is(kEndOfText)) << text;
               }));
     return code;
@@ -124,9 +123,7 @@ TEST_F(TypesTest, UnreflectedTypesStayText) {
 
 TEST_F(TypesTest, Faults) {
   const auto read = [](QrexParser& parser) {
-    TypeCode code;
-    std::string name;
-    if (!parser.ParseTypeWithName(code, &name, true, nullptr, true)) parser.Fail("no type");
+    if (!parser.ParseTypeWithName(Naming::Required, true)) parser.Fail("no type");
   };
   const Texts cases = {
       {"1", "no type"},
@@ -153,10 +150,8 @@ TEST_F(TypesTest, Faults) {
       {"int32 x : 1", "Expected [ after : when read 1"},
   };
   AssertFaults(cases, read);
-  EXPECT_EQ("error : Reached end of stream while scanning for matching >", Parse("std::vector<int", [](QrexParser& p) {
-              TypeCode code;
-              p.ParseTypeWithName(code, nullptr, false, nullptr, false);
-            }));
+  EXPECT_EQ("error : Reached end of stream while scanning for matching >",
+            Parse("std::vector<int", [](QrexParser& p) { p.ParseTypeWithName(Naming::None, false); }));
 }
 
 TEST_F(TypesTest, MetadataLimitsAndFaults) {
@@ -185,18 +180,18 @@ TEST_F(TypesTest, MetadataLimitsAndFaults) {
 
 TEST_F(TypesTest, Signatures) {
   FunctionSignature signature;
-  EXPECT_EQ("", Parse("inline K const& f([E e], int32 a[2] = g(1, 2), string8 s = \",)\") const : [1]",
-                      [&](QrexParser& parser) { parser.ParseFunctionSignature(signature, true, false, true, true); }));
+  EXPECT_EQ(
+      "",
+      Parse("inline K const& f([E e], int32 a[2] = g(1, 2), string8 s = \",)\") const : [1]", [&](QrexParser& parser) {
+        signature = parser.ParseFunctionSignature({.constAllowed = true, .polymorphic = true, .reflected = true});
+      }));
   MemoryTextWriter out;
   WriteSignature(out, signature);
   EXPECT_EQ("inline K const& f(E e,vesk::Array<vesk::int32,2> a=g(1, 2),vesk::string8 s=\",)\") const", out.TakeText());
   EXPECT_TRUE(signature.arguments.front().polymorphic);
   EXPECT_EQ("e1 a2 01 00 00 00", Hex(signature.metadata));
 
-  const auto read = [](QrexParser& parser) {
-    FunctionSignature ignored;
-    parser.ParseFunctionSignature(ignored, false, false, false, true);
-  };
+  const auto read = [](QrexParser& parser) { parser.ParseFunctionSignature({.reflected = true}); };
   const Texts cases = {
       {"1", "Function name expected when read 1"},
       {"int32 1", "Function name expected when read 1"},
@@ -211,10 +206,7 @@ TEST_F(TypesTest, Signatures) {
 }
 
 TEST_F(TypesTest, DirectionsOfRemoteArguments) {
-  const auto read = [](QrexParser& parser) {
-    FunctionArg arg;
-    parser.ParseFunctionArg(arg, true, true);
-  };
+  const auto read = [](QrexParser& parser) { parser.ParseFunctionArg({.directions = true, .reflected = true}); };
   const Texts cases = {
       {"int32 a", "[in] or [out] expected when read int32"},
       {"[into] int32 a", "in,out,inout or copy expected when read into"},
@@ -322,8 +314,7 @@ TEST_F(TypesTest, FieldTypes) {
     context.isMutable = true;
     context.inModel = inModel;
     context.serialisable = serialisable;
-    std::string message;
-    return CheckType(CodeOf(text), Root(), context, message) ? "" : message;
+    return std::string(TypeFault(CodeOf(text), Root(), context));
   };
   const std::pair<std::string, std::string> inModels[] = {
       {"const int32", "const or volatile qualifiers not permitted within models"},

@@ -20,7 +20,7 @@ class CachedFunction {
   void Parse() {
     m_head = ReadNodeHead(m_parser, m_def);
     if (m_parser.Accept(kShiftLeft)) ReadQualifiers();
-    m_parser.ParseFunctionSignature(m_written, true, false, false, m_head.reflected);
+    m_written = m_parser.ParseFunctionSignature({.constAllowed = true, .reflected = m_head.reflected});
     if (!m_written.isConst) m_parser.Fail("$cache function must be declared const");
     Normalise();
     m_parser.DropToCurrent();
@@ -105,14 +105,12 @@ void CachedFunction::Normalise() {
   m_signature = m_written;
   m_byReference = IsVoid(m_written.returnType);
   if (m_byReference) {
-    std::string_view type =
-        m_written.arguments.empty() ? std::string_view() : SkipMetadata(m_written.arguments.front().type);
-    const bool isReference = !type.empty() && static_cast<uint8_t>(type.front()) == kOpReference;
-    if (isReference) type = SkipMetadata(type.substr(1));
-    if (!isReference || static_cast<uint8_t>(type.front()) == kOpConst) {
-      m_parser.Fail("$cache function missing output type");
-    }
-    m_signature.returnType = TypeCode(type);
+    TypeView type = m_written.arguments.empty() ? TypeView() : m_written.arguments.front().type;
+    type = type.WithoutMetadata();
+    const bool isReference = type.Op() == kOpReference;
+    if (isReference) type = type.Inner().WithoutMetadata();
+    if (!isReference || type.Op() == kOpConst) m_parser.Fail("$cache function missing output type");
+    m_signature.returnType = TypeCode(type.Code());
     m_signature.arguments.erase(m_signature.arguments.begin());
   }
   m_output = TypeText(m_signature.returnType);
@@ -121,11 +119,10 @@ void CachedFunction::Normalise() {
 
 void CachedFunction::ReadInput() {
   if (!m_async) throw LexScannerException("'with' only allowed on async $cache function", m_parser.previous);
-  bool followedByParen = false;
-  if (!m_parser.ParseTypeWithName(m_inputType, &m_inputName, false, &followedByParen, m_head.reflected) ||
-      m_inputName.empty() || followedByParen) {
-    m_parser.Fail("Error parsing input type and name");
-  }
+  std::optional<ParsedType> input = m_parser.ParseTypeWithName(Naming::Optional, m_head.reflected);
+  if (!input || input->name.empty() || input->followedByParen) m_parser.Fail("Error parsing input type and name");
+  m_inputType = std::move(input->type);
+  m_inputName = std::move(input->name);
   m_out << "void " << Calc() << "_input(";
   PrintDeclaration(m_out, m_inputType, m_inputName, DeclarationMode::Reference);
   if (!m_signature.arguments.empty()) m_out << ",";
@@ -162,11 +159,8 @@ void CachedFunction::WriteCalculation() {
 // --- Keys: one parameter is its own key, several are nested pairs.
 
 std::string CachedFunction::KeyTypeFrom(size_t first) const {
-  std::string_view type = SkipMetadata(m_signature.arguments[first].type);
-  while (!type.empty() &&
-         (static_cast<uint8_t>(type.front()) == kOpReference || static_cast<uint8_t>(type.front()) == kOpConst)) {
-    type = SkipMetadata(type.substr(1));
-  }
+  TypeView type = TypeView(m_signature.arguments[first].type).WithoutMetadata();
+  while (type.Op() == kOpReference || type.Op() == kOpConst) type = type.Inner().WithoutMetadata();
   const std::string text = TypeText(type);
   if (first + 1 == m_signature.arguments.size()) return text;
   return "std::pair<" + text + "," + KeyTypeFrom(first + 1) + ">";
@@ -258,7 +252,8 @@ void CachedFunction::WriteFinalSelf(std::string_view self) {
 // The function under its declared name, which asks the node.
 void CachedFunction::WriteAccessor(const std::string& value) {
   FunctionSignature accessor = m_signature;
-  accessor.returnType.insert(0, {kOpReference, kOpConst});
+  PrependOp(accessor.returnType, kOpConst);
+  PrependOp(accessor.returnType, kOpReference);
   WriteSignature(m_out, accessor);
   m_out << "\n";
   Block body(m_out);

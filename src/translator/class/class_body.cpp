@@ -23,7 +23,7 @@ void ParseItem(QrexParser& parser, ClassDef& def) {
   for (const ClassKeyword& keyword : parser.Keywords().classLevel) {
     if (!parser.Is(keyword.word)) continue;
     keyword.parse(parser, def);
-    if (!keyword.advancesItself) parser.Advance();
+    if (keyword.endsOn == EndsOn::LastToken) parser.Advance();
     return;
   }
   ParseFieldOrMethod(parser, def);
@@ -64,9 +64,7 @@ void ParseThis(QrexParser& parser, ClassDef&) {
 
 void ParseFieldOrMethod(QrexParser& parser, ClassDef& def) {
   const char* begin = parser.current.text.begin;
-  bool isField = false;
-  FunctionSignature member;
-  parser.ParseMethodOrAttribute(true, isField, member, false, def.m_reflected);
+  auto [isField, member] = parser.ParseMethodOrAttribute({.constAllowed = true, .reflected = def.m_reflected});
   if (!isField) {
     parser.DropTo(begin);  // the method's source stays, without the `$`
     if (parser.Is(kOpenBrace)) parser.SkipToMatching(kOpenBrace, kCloseBrace, "Met EOS before read matching brace");

@@ -6,8 +6,8 @@ namespace qrex {
 class ClassDef;
 class QrexParser;
 
-void ParseClassBody(QrexParser& parser, ClassDef& def);  // on `{`; leaves it on the matching `}`
+void ParseClassBody(QrexParser& parser, ClassDef& def);  // on `{`; afterwards on the matching `}`
 void ParseFieldOrMethod(QrexParser& parser, ClassDef& def);
-void ParseThis(QrexParser& parser, ClassDef& def);  // stands behind the word afterwards
+void ParseThis(QrexParser& parser, ClassDef& def);  // on the word; afterwards behind it
 
 }  // namespace qrex

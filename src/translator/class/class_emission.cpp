@@ -1,4 +1,4 @@
-// The members and operators of a class: what stands in its text and behind it.
+// The members and operators of a class: generated text inside the class and behind it.
 
 #include "translator/class/class_emission.h"
 
@@ -31,10 +31,10 @@ void WriteArchiveMembers(TextWriter& out, const ClassDef& def) {
     if (def.m_referencedModel) out << kArchiveFunctions;
     return;
   }
-  if (def.IsMixin() || def.IsTemplate()) {
-    WriteSerialise(out, def, TextPlace::Inline);
-    WriteDeserialise(out, def, TextPlace::Inline);
-    if (!def.m_inheritsModel) WriteVisiting(out, def, TextPlace::Inline);
+  if (def.MemberPlacement() == Placement::InClass) {
+    WriteSerialise(out, def, Placement::InClass);
+    WriteDeserialise(out, def, Placement::InClass);
+    if (!def.m_inheritsModel) WriteVisiting(out, def, Placement::InClass);
     return;
   }
   if (def.CanSerialiseEmbeddedModel()) out << kArchiveFunctions;
@@ -66,7 +66,7 @@ void WriteGetReflectedClass(TextWriter& out, const ClassDef& def, std::string_vi
 
 void WriteInterfaceMembers(TextWriter& out, const ClassDef& def) {
   if (!def.m_implementsIObject) return;
-  if (!def.HaveSomethingToRegister() || def.IsMixin() || def.IsTemplate()) {
+  if (!def.HaveSomethingToRegister() || def.MemberPlacement() == Placement::InClass) {
     WriteQueryInterface(out, def, "");
     WriteGetReflectedClass(out, def, "");
   } else {
@@ -256,7 +256,7 @@ void WriteForwardDeclaration(TextWriter& out, const ClassDef& def) {
 
 void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def) {
   if (!def.m_reflected) return;
-  if (def.IsMixin() || def.IsTemplate()) return WriteGetTypeOps(out, def);
+  if (def.MemberPlacement() == Placement::InClass) return WriteGetTypeOps(out, def);
   for (std::string_view text : {"vesk::ReflectedClass const& _GetReflected(", "vesk::TypeOps const& _GetTypeOps("}) {
     out << ExportPrefix(def) << text << def.GetTemplateClassName() << " const*);\n";
   }

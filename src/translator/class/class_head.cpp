@@ -58,8 +58,8 @@ void ParseBaseList(QrexParser& parser, std::vector<ClassDef*>& bases) {
 
 namespace {
 
-// The head in the making. B, the generated base, grows from the inside out: raw bases or an empty base, the wrapper of
-// the runtime, the model mixin, then each entry of the mixin list.
+// Parses and writes one head. B, the generated base, grows from the inside out: raw bases or an empty base, the wrapper
+// of the runtime, the model mixin, then each entry of the mixin list.
 class ClassHead {
  public:
   ClassHead(QrexParser& parser, ClassDef& def, bool isFinal)
@@ -101,7 +101,7 @@ class ClassHead {
   TextWriter& m_out;
   ClassDef& m_def;
   const bool m_isFinal;
-  bool m_colon = false;  // what stands here came behind a `:`
+  bool m_colon = false;  // a `:` came before the current token
   bool m_haveMixinList = false;
   bool m_forwardWritten = false;
   bool m_folded = false;  // the raw bases went into N__BASE

@@ -1,5 +1,5 @@
-// What stands between a class's qualifiers and its body: interfaces, bases, model, mixin list, and the C++ head they
-// make.
+// The part of a class statement between its qualifiers and its body: interfaces, bases, model, mixin list, and the C++
+// head they make.
 #pragma once
 
 #include <vector>

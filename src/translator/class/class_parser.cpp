@@ -17,7 +17,7 @@ namespace qrex {
 
 namespace {
 
-// One statement in the making.
+// Parses one statement; the members are its intermediate results.
 class ClassStatement {
  public:
   ClassStatement(QrexParser& parser, ClassKind kind, ClassDef* enclosing)
@@ -97,7 +97,7 @@ void ClassStatement::MakeElement() {
   if (m_parser.Is(kLess)) ReadTemplateArguments();
 }
 
-// The current token is `<`; stands behind the matching `>` afterwards.
+// The current token is `<`, afterwards the one behind the matching `>`.
 void ClassStatement::ReadTemplateArguments() {
   const char* begin = m_parser.current.text.end;
   std::string names;

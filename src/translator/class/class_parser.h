@@ -7,7 +7,7 @@ namespace qrex {
 
 class QrexParser;
 
-// The keyword is the current token; leaves it on the closing `;`.
+// The current token is the keyword, afterwards the closing `;`.
 void ParseClass(QrexParser& parser, ClassKind kind, ClassDef* enclosing);  // `enclosing`: null at file level
 
 }  // namespace qrex

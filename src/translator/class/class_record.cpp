@@ -13,7 +13,7 @@ namespace qrex {
 
 namespace {
 
-// A record in the making: all arrays share one string table, and the last rows name what stands above them.
+// Writes one record: all its arrays share one string table, and its last rows refer to the arrays above them.
 class ClassRecord {
  public:
   ClassRecord(TextWriter& out, const ClassDef& def) : m_out(out), m_def(def), m_name(def.name) {}
@@ -82,18 +82,16 @@ void ClassRecord::WriteDepFields() {
 }
 
 void ClassRecord::WriteMapOrSetFunctions(const ModelField& field) {
-  std::string_view code = MapOrSetIn(field.m_type);
-  if (code.empty()) return;
+  TypeView type = MapOrSetIn(field.m_type);
+  if (type.Empty()) return;
   m_out << "static const vesk::PtrMapOrSetFns " << m_name << "_" << field.m_name << "_mapOrSetfns[] = \n";
   Block rows(m_out, ";");
-  while (!code.empty()) {
-    const std::string type = TypeText(code);
-    if (static_cast<uint8_t>(code.front()) == kOpSet) {
-      m_out << "{(const vesk::XMapFns*) &vesk::IXSet::Stubs<" << type << " >::GetTable()},\n";
+  for (; !type.Empty(); type = MapOrSetIn(type.Value())) {
+    if (type.Op() == kOpSet) {
+      m_out << "{(const vesk::XMapFns*) &vesk::IXSet::Stubs<" << TypeText(type) << " >::GetTable()},\n";
       return;
     }
-    m_out << "{&vesk::IXMap::Stubs<" << type << " >::GetTable()},\n";
-    code = MapOrSetIn(MapValue(code));
+    m_out << "{&vesk::IXMap::Stubs<" << TypeText(type) << " >::GetTable()},\n";
   }
 }
 
@@ -222,14 +220,14 @@ void WriteGetTypeOps(TextWriter& out, const ClassDef& def) {
 
 void ClassDef::WriteReflectedDefinition(TextWriter& out) {
   if (HasCreateFunction(*this)) WriteCreateInstance(out, *this);
-  if (IsMixin() || IsTemplate()) return;
+  if (MemberPlacement() == Placement::InClass) return;
   WriteGetReflected(out, *this);
   WriteGetTypeOps(out, *this);
 }
 
 void ClassDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   if (!HaveSomethingToRegister()) return;
-  const bool isConcrete = !IsMixin() && !IsTemplate();
+  const bool isConcrete = MemberPlacement() == Placement::OutOfClass;
   WriteReflectionHead(out, *this);
   if (isConcrete) WriteModelRsnDeclarations(out, *this);
   NameSpaceFrame frame(out, parent);
@@ -238,9 +236,9 @@ void ClassDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   if (isConcrete) {
     if (m_implementsIObject) WriteInterfaceDefinitions(out, *this);
     if (HasEmbeddedModel()) {
-      WriteVisiting(out, *this, TextPlace::OutOfLine);
-      WriteSerialise(out, *this, TextPlace::OutOfLine);
-      WriteDeserialise(out, *this, TextPlace::OutOfLine);
+      WriteVisiting(out, *this, Placement::OutOfClass);
+      WriteSerialise(out, *this, Placement::OutOfClass);
+      WriteDeserialise(out, *this, Placement::OutOfClass);
     }
     WriteDataSourceRsnFunctions(out, *this);
   }

@@ -108,11 +108,12 @@ void NodeField::ReadHead() {
   const NodeHead head = ReadNodeHead(m_parser, m_def);
   if (head.hard && m_isIndep) throw LexScannerException("^ not permitted on $indep", m_parser.previous);
   if (m_parser.Accept(kShiftLeft)) ReadVisitQualifier();
-  if (!m_parser.ParseTypeWithName(m_type, &m_name, true, nullptr, head.reflected)) {
-    m_parser.Fail(m_isIndep ? "Syntax error" : "Type expected when read " + Printed(m_parser.current));
-  }
+  std::optional<ParsedType> parsed = m_parser.ParseTypeWithName(Naming::Required, head.reflected);
+  if (!parsed) m_parser.Fail(m_isIndep ? "Syntax error" : "Type expected when read " + Printed(m_parser.current));
+  m_name = std::move(parsed->name);
+  m_type = std::move(parsed->type);
   m_storage = "_" + m_name + "_";
-  m_isVoid = !m_type.empty() && m_type.front() == static_cast<char>(kOpVoid);
+  m_isVoid = TypeView(m_type).Op() == kOpVoid;
   if (m_isVoid && m_isIndep) m_parser.Fail("void not permitted on $indep");
   m_hard = head.hard || m_isVoid;
   const bool repeats =

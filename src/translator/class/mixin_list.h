@@ -9,8 +9,8 @@ namespace qrex {
 
 class QrexParser;
 
-void ParseMixinList(QrexParser& parser, ClassDef& def, std::string& baseText);  // on `[`; stands behind `]` afterwards
-void ParseAdtBody(QrexParser& parser, ClassDef& adt);                           // on `{`; leaves it on the matching `}`
-void ParseImplementing(QrexParser& parser, ClassDef& def);                      // on the word; leaves it on `;`
+void ParseMixinList(QrexParser& parser, ClassDef& def, std::string& baseText);  // on `[`; afterwards behind `]`
+void ParseAdtBody(QrexParser& parser, ClassDef& adt);       // on `{`; afterwards on the matching `}`
+void ParseImplementing(QrexParser& parser, ClassDef& def);  // on the word; afterwards on `;`
 
 }  // namespace qrex

@@ -9,20 +9,28 @@ namespace qrex {
 
 namespace {
 
-constexpr TraitsKind kTraitsKinds[] = {TraitsKind::Struct, TraitsKind::Class, TraitsKind::Adt, TraitsKind::Other,
-                                       TraitsKind::Model};
+DeclKind DeclKindOf(ClassKind kind) {
+  switch (kind) {
+    case ClassKind::Struct:
+      return DeclKind::Struct;
+    case ClassKind::Class:
+      return DeclKind::Class;
+    case ClassKind::Adt:
+      return DeclKind::Adt;
+    case ClassKind::Mixin:
+      return DeclKind::Mixin;
+    case ClassKind::Model:
+      return DeclKind::Model;
+  }
+  return DeclKind::Class;
+}
 
 }  // namespace
 
 ClassDef::ClassDef(ScannedFile& owner, const char* position, ClassKind kind)
-    : RecordedElement(owner, position, Category::Class), kind(kind) {
-  traitsKind = kTraitsKinds[static_cast<size_t>(kind)];
-}
+    : RecordedElement(owner, position, DeclKindOf(kind)), kind(kind) {}
 
-std::string_view KeywordOf(ClassKind kind) {
-  static constexpr std::string_view kWords[] = {"struct", "class", "adt", "mixin", "model"};
-  return kWords[static_cast<size_t>(kind)];
-}
+std::string_view KeywordOf(ClassKind kind) { return TraitsOf(DeclKindOf(kind)).keyword; }
 
 bool ClassDef::HaveSomethingToRegister() const {
   if (m_nested || status != DeclStatus::Defined || IsMixin()) return false;
@@ -30,7 +38,7 @@ bool ClassDef::HaveSomethingToRegister() const {
          (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
 }
 
-// What the record names, in its order: the fields of the mixins stand in it behind the class's own.
+// In the order of the record: the fields of mixins follow the class's own.
 void ClassDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
   std::vector<const ClassDef*> sources = {this};
   sources.insert(sources.end(), m_mixins.begin(), m_mixins.end());
@@ -94,9 +102,9 @@ bool ClassDef::HasSerialise() const {
 
 bool ClassDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
 
-// A model may hold containers of its own class: while the answer is worked out, it counts as no. The traits may ask
-// ahead of a body that brings the model.
-bool ClassDef::AnyModelField(bool (*test)(std::string_view, NameSpace&), TriState& cache) const {
+// Recursion guard: while being computed the answer is false, since a model may contain containers of its own class. Not
+// cached before the body is read, since traits may be written earlier.
+bool ClassDef::AnyModelField(bool (*test)(TypeView, NameSpace&), TriState& cache) const {
   if (cache == TriState::Unset && HasEmbeddedModel()) {
     cache = TriState::Off;
     for (const ModelField* field : m_modelFields) {
@@ -142,7 +150,7 @@ bool ClassDef::CanSerialiseEmbeddedModel() const {
     });
     m_canSerialiseModel = can ? Memo::Yes : Memo::No;
   }
-  return m_canSerialiseModel != Memo::No;  // a model that holds itself in a container doesn't stand in its own way
+  return m_canSerialiseModel != Memo::No;  // a model that contains itself in a container is no obstacle to itself
 }
 
 bool ClassDef::WriteInsertionExtractionInTermsOfSerialise() const {

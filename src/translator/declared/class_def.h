@@ -11,7 +11,7 @@
 #include "translator/emit/records.h"
 #include "translator/symbols/name_space.h"
 #include "translator/symbols/type_predicates.h"
-#include "translator/types/type_code.h"
+#include "translator/types/type_view.h"
 
 namespace qrex {
 
@@ -19,6 +19,8 @@ class InterfaceDef;
 
 enum class ClassKind { Struct, Class, Adt, Mixin, Model };
 std::string_view KeywordOf(ClassKind kind);
+
+enum class Placement { InClass, OutOfClass };
 
 struct ModelField {
   std::string m_name;
@@ -34,12 +36,9 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
  public:
   ClassDef(ScannedFile& owner, const char* position, ClassKind kind);
 
-  std::string_view GetKeyword() const override { return KeywordOf(kind); }
-  std::string_view GetReflectedKindName() const override { return "Class"; }
   bool HaveSomethingToRegister() const override;
   void WriteReflectedDefinition(TextWriter& out) override;
   void WriteReflection(TextWriter& out, RegistrationLists& lists) override;
-  DeclStatus GetDeclStatus() const override { return status; }
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
   bool ContainsMetaData() const override;
   void WriteExtraTraits(TextWriter& out) const override;
@@ -50,12 +49,11 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   bool IsPureModel() const { return kind == ClassKind::Model; }
   bool IsUnderlyingStruct() const { return kind != ClassKind::Class; }
   bool IsTemplate() const { return !m_templateArgList.empty(); }
-  bool ImplementsIObject() const { return m_implementsIObject; }
-  bool ImplementsIPersistable() const { return m_implementsIPersistable; }
+  // Where its generated members are defined; what depends on template parameters stays in the class.
+  Placement MemberPlacement() const { return IsMixin() || IsTemplate() ? Placement::InClass : Placement::OutOfClass; }
   bool ExternalDefinition() const { return qualifiers.extern_ == TriState::On; }
   bool WriteTraits() const { return qualifiers.traits != TriState::Off && !m_nested && !IsTemplate(); }
-  std::string_view StructWord() const { return kind == ClassKind::Class ? "class " : "struct "; }
-  const std::string& GetTemplateArgList() const { return m_templateArgList; }
+  std::string_view StructWord() const { return IsUnderlyingStruct() ? "struct " : "class "; }
   const std::string& GetTemplateClassName() const;  // N, or N<argument names>
   std::string TemplateArgs() const;                 // <argument names> or nothing
   // "template <...>" and what follows it; or nothing.
@@ -77,7 +75,6 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
 
   // --- Its model (model.h)
   bool HasEmbeddedModel() const { return m_numModelSchema > 0; }
-  bool UsingModelBaseClass() const { return m_inheritsModel; }
   bool GenerateOps() const;
   int64_t GetNumNonDroppedModelFields() const;
   bool CanSerialiseEmbeddedModel() const;
@@ -114,7 +111,7 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   std::vector<std::unique_ptr<NameSpaceElement>> m_ownedElements;  // nested ones and anonymous mixins: in no name space
 
  private:
-  bool AnyModelField(bool (*test)(std::string_view, NameSpace&), TriState& cache) const;
+  bool AnyModelField(bool (*test)(TypeView, NameSpace&), TriState& cache) const;
   mutable std::string m_templateClassName;
   mutable TriState m_isIObjectVisitable{}, m_isPrefVisitable{};
   enum class Memo { NotComputed, BeingComputed, No, Yes };

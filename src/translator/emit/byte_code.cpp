@@ -17,72 +17,6 @@ uint16_t StringTable::Add(std::string_view text) {
 
 namespace {
 
-// Rewrites a code: each inline string becomes its index.
-class ByteCodeWriter {
- public:
-  ByteCodeWriter(StringTable& strings, std::string_view code) : m_strings(strings), m_rest(code) {}
-
-  void TranslateType() {
-    for (;;) {
-      const uint8_t op = Take();
-      if (op >= 160) {
-        TranslateMetadataOf(op);
-      } else if (op < kOpClass) {
-        return;
-      } else if (op < kOpVolatile) {
-        return TakeString();
-      } else if (op == kOpArray) {
-        TakeBytes(4);
-      } else if (op == kOpMap) {
-        TranslateType();
-      }
-    }
-  }
-
-  void TranslateMetadata() { TranslateMetadataOf(Take()); }
-  const std::string& Bytes() const { return m_bytes; }
-
- private:
-  uint8_t Take() {
-    if (m_rest.empty()) return 0;
-    const char op = m_rest.front();
-    TakeBytes(1);
-    return static_cast<uint8_t>(op);
-  }
-
-  void TakeBytes(size_t count) {
-    m_bytes.append(m_rest.substr(0, count));
-    m_rest.remove_prefix(std::min(count, m_rest.size()));
-  }
-
-  void TakeString() {
-    std::string_view text;
-    ReadCompactString(m_rest, text);
-    const uint16_t index = m_strings.Add(text);
-    m_bytes += static_cast<char>(index & 0xFF);
-    m_bytes += static_cast<char>(index >> 8);
-  }
-
-  void TranslateMetadataOf(uint8_t op) {
-    size_t values = 0;
-    if (op >= kOpMetaList) {
-      values = op - kOpMetaList;
-    } else if (op >= kOpMetaFunctor) {
-      values = op - kOpMetaFunctor;
-      TakeString();
-    } else if (op == kOpMetaString) {
-      TakeString();
-    } else {
-      TakeBytes(op == kOpMetaBool ? 1 : op == kOpMetaInt ? 4 : 8);
-    }
-    for (; values > 0; --values) TranslateMetadata();
-  }
-
-  StringTable& m_strings;
-  std::string_view m_rest;
-  std::string m_bytes;
-};
-
 constexpr size_t kBytesPerLine = 16;
 
 void WriteArray(TextWriter& out, std::string_view name, const std::string& bytes) {
@@ -101,16 +35,12 @@ void WriteArray(TextWriter& out, std::string_view name, const std::string& bytes
 }  // namespace
 
 void WriteTypeByteCode(TextWriter& out, std::string_view arrayName, StringTable& strings, std::string_view typeCode) {
-  ByteCodeWriter writer(strings, typeCode);
-  writer.TranslateType();
-  WriteArray(out, arrayName, writer.Bytes());
+  WriteArray(out, arrayName, IndexedType(typeCode, [&](std::string_view text) { return strings.Add(text); }));
 }
 
 void WriteMetadataByteCode(TextWriter& out, std::string_view arrayName, StringTable& strings,
                            std::string_view metadata) {
-  ByteCodeWriter writer(strings, metadata);
-  writer.TranslateMetadata();
-  WriteArray(out, arrayName, writer.Bytes());
+  WriteArray(out, arrayName, IndexedMetadata(metadata, [&](std::string_view text) { return strings.Add(text); }));
 }
 
 void WriteStringTable(TextWriter& out, const StringTable& strings, std::string_view prefix) {

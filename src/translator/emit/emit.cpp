@@ -54,10 +54,6 @@ void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, co
   WriteArgDeclarations(out, method.arguments);
 }
 
-void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments) {
-  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { PrintType(out, argument.type); });
-}
-
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments) {
   WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { out << argument.name; });
 }

@@ -8,7 +8,7 @@
 
 #include "text/text_writer.h"
 #include "translator/symbols/name_space.h"
-#include "translator/types/type_code.h"
+#include "translator/types/type_view.h"
 
 namespace qrex {
 
@@ -55,7 +55,6 @@ void WriteJoined(TextWriter& out, const Items& items, std::string_view separator
 
 // Argument lists, all without their parentheses.
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "T a,U b"
-void WriteArgTypes(TextWriter& out, const std::vector<FunctionArg>& arguments);         // "T,U"
 // "N const* _self,T a,U b": the arguments of a function that stands for a method of N.
 void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, const FunctionSignature& method);
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "a,b"

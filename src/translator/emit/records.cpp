@@ -64,14 +64,11 @@ void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element) {
   out << "namespace vesk\n{\n";
   out << "template<> struct TypeTraits<" << element.GetQualifiedName() << ">\n";
   {
-    static constexpr std::string_view kKinds[] = {"TTK_other",     "TTK_struct",  "TTK_class",   "TTK_adt", "TTK_model",
-                                                  "TTK_interface", "TTK_functor", "TTK_variant", "TTK_enum"};
     Block traits(out, ";");
     out << "static const bool is_exported = " << BitText(element.m_exported) << ";\n";
     out << "static const bool is_reflected = " << BitText(element.m_reflected) << ";\n";
     out << "static const bool is_registered = " << BitText(element.EffectivelyRegistered()) << ";\n";
-    out << "static const vesk::ETypeTraitKind kind = vesk::" << kKinds[static_cast<size_t>(element.traitsKind)]
-        << ";\n";
+    out << "static const vesk::ETypeTraitKind kind = vesk::" << element.kindTraits.traits << ";\n";
     out << "static const bool has_metadata = " << BitText(element.ContainsMetaData()) << ";\n";
   }
   element.WriteExtraTraits(out);

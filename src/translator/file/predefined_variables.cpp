@@ -13,7 +13,7 @@ void Define(ScannedFile& file, std::string_view name, std::string value) {
   file.frame.AddVariable(std::make_unique<LSVar>("@" + std::string(name), std::move(value)));
 }
 
-// `@macroNAME` stands for nothing: it exists, so that `@if` can tell a defined macro from one that is not.
+// `@macroNAME` is empty: it exists so that `@if` can tell a defined macro from one that is not.
 void DefineMacroMark(ScannedFile& file, const std::string& piece) {
   auto mark = std::make_unique<LSMacroVariable>();
   const std::string name = "@macro" + piece;

@@ -1,5 +1,5 @@
-// What stands behind the text of a translated .cpp file: the records of what it declares, and how their registration
-// functions end in one function per project.
+// The text behind a translated .cpp file: the reflection records of what it declares, and the function that registers
+// all of a project.
 #pragma once
 
 #include "text/text_writer.h"

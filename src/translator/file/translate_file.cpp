@@ -165,7 +165,7 @@ bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated) {
   try {
     return SameTokens(LexScanner(std::string_view(old)), LexScanner(std::string_view(text)));
   } catch (const LexScannerException&) {
-    return false;  // what stood there is no text of ours
+    return false;  // the old file is not C++ that the scanner accepts
   }
 }
 

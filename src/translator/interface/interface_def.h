@@ -17,16 +17,11 @@ struct AttributeDef {
 
 class InterfaceDef : public RecordedElement {
  public:
-  InterfaceDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Interface) {
-    traitsKind = TraitsKind::Interface;
-  }
+  InterfaceDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, DeclKind::Interface) {}
 
-  std::string_view GetKeyword() const override { return "interface"; }
-  std::string_view GetReflectedKindName() const override { return "Interface"; }
   bool HaveSomethingToRegister() const override;
   void WriteReflectedDefinition(TextWriter& out) override;
   void WriteReflection(TextWriter& out, RegistrationLists& lists) override;
-  DeclStatus GetDeclStatus() const override { return status; }
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
   bool ContainsMetaData() const override;
   void WriteExtraTraits(TextWriter& out) const override;
@@ -47,7 +42,6 @@ class InterfaceDef : public RecordedElement {
   std::vector<InterfaceDef*> m_bases;
   size_t m_numTables = 1;  // its own and those of its bases, which its function table embeds once per path
   std::vector<FunctionSignature> m_methods;  // declared ones, then those made from attributes
-  size_t m_numDeclaredMethods = 0;
   std::vector<AttributeDef> m_attributes;
 };
 

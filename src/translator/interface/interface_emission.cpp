@@ -124,7 +124,7 @@ void WriteInterfaceHandle(TextWriter& out, const InterfaceDef& interface) {
   {
     Block attributes(out, ";");
     for (const AttributeDef& attribute : interface.m_attributes) {
-      AttributeWriter writer(out, *interface.owner.rootNameSpace, true, false);
+      AttributeWriter writer(out, *interface.owner.rootNameSpace, Access::Methods);
       writer.WriteStruct(interface.name, attribute.type, attribute.name, attribute.name, attribute.name, false);
     }
     out << "void* m_self;\n";

@@ -19,23 +19,19 @@ class AttributeExpansion {
   explicit AttributeExpansion(InterfaceDef& interface)
       : m_methods(interface.m_methods), m_root(*interface.owner.rootNameSpace) {}
 
-  void Expand(const std::string& name, std::string_view type, size_t depth, bool readOnly) {
-    std::string_view code = SkipToType(type, m_root);
-    for (; static_cast<uint8_t>(code.front()) == kOpConst; code = SkipToType(type, m_root)) {
+  void Expand(const std::string& name, TypeView type, size_t depth, bool readOnly) {
+    TypeView resolved = Resolved(type, m_root);
+    for (; resolved.Op() == kOpConst; resolved = Resolved(type, m_root)) {
       readOnly = true;
-      type = code.substr(1);
+      type = resolved.Inner();
     }
-    switch (static_cast<uint8_t>(code.front())) {
-      case kOpClass:
-        ExpandClass(name, code, depth, readOnly);
-        break;
-      case kOpVector:
-        ExpandVector(name, code, depth, readOnly);
-        break;
-      default:
-        AddGetter("Get" + name, type, depth);
-        if (!readOnly) AddSetter("Set" + name, depth).push_back(Argument(TypeCode(type), name));
-        break;
+    if (resolved.Op() == kOpClass) {
+      ExpandClass(name, resolved, depth, readOnly);
+    } else if (resolved.Op() == kOpVector) {
+      ExpandVector(name, resolved, depth, readOnly);
+    } else {
+      AddGetter("Get" + name, type, depth);
+      if (!readOnly) AddSetter("Set" + name, depth).push_back(Argument(TypeCode(type.Code()), name));
     }
   }
 
@@ -47,7 +43,12 @@ class AttributeExpansion {
     return argument;
   }
 
-  static TypeCode Int32() { return TypeCode(1, static_cast<char>(kOpInt32)); }
+  static TypeCode Plain(TypeOp op) {
+    TypeCode code;
+    AppendOp(code, op);
+    return code;
+  }
+  static TypeCode Int32() { return Plain(kOpInt32); }
 
   FunctionSignature& Add(std::string name, TypeCode returnType, size_t depth) {
     FunctionSignature& method = m_methods.emplace_back();
@@ -57,25 +58,26 @@ class AttributeExpansion {
     return method;
   }
 
-  void AddGetter(std::string name, std::string_view type, size_t depth) {
-    Add(std::move(name), TypeCode(type), depth).isConst = true;
+  void AddGetter(std::string name, TypeView type, size_t depth) {
+    Add(std::move(name), TypeCode(type.Code()), depth).isConst = true;
   }
 
   std::vector<FunctionArg>& AddSetter(std::string name, size_t depth) {
-    return Add(std::move(name), TypeCode(1, static_cast<char>(kOpVoid)), depth).arguments;
+    return Add(std::move(name), Plain(kOpVoid), depth).arguments;
   }
 
-  void ExpandClass(const std::string& name, std::string_view code, size_t depth, bool readOnly) {
-    const auto* element = NamedElement(code, m_root);
+  void ExpandClass(const std::string& name, TypeView type, size_t depth, bool readOnly) {
+    const auto* element = NamedElement(type, m_root);
     if (!element || element->category != Category::Class) return;
     for (const ModelField* field : static_cast<const ClassDef*>(element)->m_modelFields) {
       if (!field->IsDropped()) Expand(name + field->m_name, field->m_type, depth, readOnly);
     }
   }
 
-  void ExpandVector(const std::string& name, std::string_view vector, size_t depth, bool readOnly) {
-    const std::string_view element = vector.substr(1);
-    const TypeCode reference = static_cast<char>(kOpReference) + TypeCode(vector);
+  void ExpandVector(const std::string& name, TypeView vector, size_t depth, bool readOnly) {
+    const TypeView element = vector.Inner();
+    TypeCode reference(vector.Code());
+    PrependOp(reference, kOpReference);
     AddGetter("Get" + name + "Size", Int32(), depth);
     if (!readOnly) {
       auto& deleted = AddSetter("DeleteFrom" + name, depth);
@@ -89,10 +91,10 @@ class AttributeExpansion {
       inserted.push_back(Argument(reference, "src"));
       for (const char* argument : {"si1", "si2"}) inserted.push_back(Argument(Int32(), argument));
     }
-    const uint8_t op = static_cast<uint8_t>(SkipToType(element, m_root).front());
-    if (op >= kOpBool && op <= kOpString16) {
+    const TypeView resolved = Resolved(element, m_root);
+    if (resolved.IsBuiltIn() && resolved.Op() != kOpVoid) {
       AddGetter("Get" + name + "Element", element, depth + 1);
-      if (!readOnly) AddSetter("Set" + name + "Element", depth + 1).push_back(Argument(TypeCode(element), "e"));
+      if (!readOnly) AddSetter("Set" + name + "Element", depth + 1).push_back(Argument(TypeCode(element.Code()), "e"));
     } else {
       Expand(name + "Element", element, depth + 1, readOnly);
     }
@@ -235,15 +237,14 @@ void InterfaceStatement::CheckBases() {
 
 void InterfaceStatement::ReadMembers() {
   while (!m_parser.Is(kCloseBrace)) {
-    bool isAttribute = false;
-    FunctionSignature member;
-    m_parser.ParseMethodOrAttribute(true, isAttribute, member, m_def->m_isIpc, m_def->m_reflected);
+    auto [isAttribute, signature] = m_parser.ParseMethodOrAttribute(
+        {.constAllowed = true, .directions = m_def->m_isIpc, .reflected = m_def->m_reflected});
     if (isAttribute) {
       if (m_def->m_isIpc) m_parser.Fail("Attributes currently not supported on IPC interfaces");
-      CheckAttribute(member.name, member.returnType);
-      m_def->m_attributes.push_back({member.name, member.returnType});
+      CheckAttribute(signature.name, signature.returnType);
+      m_def->m_attributes.push_back({signature.name, signature.returnType});
     } else {
-      m_def->m_methods.push_back(std::move(member));
+      m_def->m_methods.push_back(std::move(signature));
     }
     m_parser.Expect(kSemicolon, ";");
   }
@@ -257,7 +258,6 @@ void InterfaceStatement::CheckAttribute(const std::string& name, const TypeCode&
 }
 
 void InterfaceStatement::WriteText() {
-  m_def->m_numDeclaredMethods = m_def->m_methods.size();
   AttributeExpansion expansion(*m_def);
   for (const AttributeDef& attribute : m_def->m_attributes) expansion.Expand(attribute.name, attribute.type, 0, false);
   WriteInterfaceHandle(m_parser.out, *m_def);

@@ -4,6 +4,8 @@
 
 #include "translator/interface/remote_interface.h"
 
+#include <algorithm>
+
 #include "translator/emit/emit.h"
 #include "translator/symbols/scanned_file.h"
 
@@ -21,12 +23,10 @@ size_t CountResults(const FunctionSignature& method) {
   return count;
 }
 
-std::string_view WithoutLeading(std::string_view type, std::initializer_list<uint8_t> ops) {
-  for (type = SkipMetadata(type);; type = SkipMetadata(type.substr(1))) {
-    bool leads = false;
-    for (uint8_t op : ops) leads = leads || static_cast<uint8_t>(type.front()) == op;
-    if (!leads) return type;
-  }
+TypeView WithoutLeading(TypeView type, std::initializer_list<TypeOp> ops) {
+  type = type.WithoutMetadata();
+  while (std::find(ops.begin(), ops.end(), type.Op()) != ops.end()) type = type.Inner().WithoutMetadata();
+  return type;
 }
 
 class RemoteText {
@@ -139,9 +139,9 @@ void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
     m_out << "Pop();\n";
   } else {
     for (const FunctionArg& arg : method.arguments) {
-      const std::string_view type = WithoutLeading(arg.type, {kOpReference, kOpConst});
+      const TypeView type = WithoutLeading(arg.type, {kOpReference, kOpConst});
       if (arg.direction == ArgDirection::Copy) {
-        WriteText(m_out, "std::auto_ptr<$0> $1(new $0);\n", {TypeText(SkipMetadata(type).substr(1)), arg.name});
+        WriteText(m_out, "std::auto_ptr<$0> $1(new $0);\n", {TypeText(type.Inner()), arg.name});
       } else {
         PrintDeclaration(m_out, type, arg.name, DeclarationMode::Plain);
         m_out << ";\n";

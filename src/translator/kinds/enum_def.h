@@ -12,14 +12,9 @@ namespace qrex {
 
 class EnumDef : public RecordedElement {
  public:
-  EnumDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Enum) {
-    traitsKind = TraitsKind::Enum;
-  }
-  std::string_view GetKeyword() const override { return "enum"; }
-  std::string_view GetReflectedKindName() const override { return "Enum"; }
+  EnumDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, DeclKind::Enum) {}
   bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined; }
   void WriteReflectedDefinition(TextWriter& out) override;
-  DeclStatus GetDeclStatus() const override { return status; }
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
 
   bool HasDisabledLabel() const;

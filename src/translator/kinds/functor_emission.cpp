@@ -14,7 +14,7 @@ void WriteSelfSignature(TextWriter& out, const FunctionSignature& signature, std
 
 namespace {
 
-// "public:" and "private:" stand to the left of the members.
+// "public:" and "private:" are outdented by one level.
 void WriteAccess(TextWriter& out, std::string_view access) {
   IndentScope outdent(out, -4);
   out << access << ":\n";

@@ -19,7 +19,7 @@ void ParseFunctor(QrexParser& parser, bool nested) {
     parser.ParseQualifiers(def);
     parser.CheckRedundant(def);
   }
-  parser.ParseFunctionSignature(def.signature, false, false, false, def.m_reflected);
+  def.signature = parser.ParseFunctionSignature({.reflected = def.m_reflected});
   def.name = def.signature.name;
   def.metadata = def.signature.metadata;
   if (NameSpaceElement* found = parser.Current().Lookup(def.name)) parser.FailConflict("functor", def.name, *found);

@@ -17,12 +17,9 @@ class GlobalDef : public NameSpaceElement {
 
 class GlobalFunctionDef : public GlobalDef {
  public:
-  GlobalFunctionDef(ScannedFile& owner, const char* position) : GlobalDef(owner, position, Category::GlobalFunction) {}
-  std::string_view GetKeyword() const override { return "function"; }
-  std::string_view GetReflectedKindName() const override { return "GlobalFunction"; }
+  GlobalFunctionDef(ScannedFile& owner, const char* position) : GlobalDef(owner, position, DeclKind::Function) {}
   bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined && m_registered; }
   void WriteReflectedDefinition(TextWriter& out) override;
-  DeclStatus GetDeclStatus() const override { return status; }
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
   bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(signature); }
 
@@ -31,12 +28,11 @@ class GlobalFunctionDef : public GlobalDef {
 
 class GlobalVarDef : public GlobalDef {
  public:
-  GlobalVarDef(ScannedFile& owner, const char* position) : GlobalDef(owner, position, Category::GlobalVar) {}
-  std::string_view GetKeyword() const override { return "var"; }
-  std::string_view GetReflectedKindName() const override { return "GlobalVariable"; }
+  GlobalVarDef(ScannedFile& owner, const char* position) : GlobalDef(owner, position, DeclKind::Var) {
+    status = DeclStatus::Defined;
+  }
   bool HaveSomethingToRegister() const override { return m_registered; }
   void WriteReflectedDefinition(TextWriter& out) override;
-  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
   bool ContainsMetaData() const override { return !metadata.empty() || HasMetadata(type); }
 
@@ -45,12 +41,11 @@ class GlobalVarDef : public GlobalDef {
 
 class TypedefDef : public GlobalDef, public TypedefTarget {
  public:
-  TypedefDef(ScannedFile& owner, const char* position) : GlobalDef(owner, position, Category::Typedef) {}
-  std::string_view GetKeyword() const override { return "typedef"; }
-  std::string_view GetReflectedKindName() const override { return "Typedef"; }
+  TypedefDef(ScannedFile& owner, const char* position) : GlobalDef(owner, position, DeclKind::Typedef) {
+    status = DeclStatus::Defined;
+  }
   bool HaveSomethingToRegister() const override { return m_reflected; }
   void WriteReflectedDefinition(TextWriter& out) override;
-  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
   bool ContainsMetaData() const override { return !metadata.empty() || HasMetadata(type); }
   const TypeCode& TargetType() const override { return type; }

@@ -73,7 +73,7 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
   parser.ParseExportModifier(def);
   const char* const statement = parser.current.text.begin;
   if (parser.Is(kShiftLeft)) parser.ParseQualifiers(def);
-  parser.ParseFunctionSignature(def.signature, false, false, polymorphic, def.m_reflected);
+  def.signature = parser.ParseFunctionSignature({.polymorphic = polymorphic, .reflected = def.m_reflected});
   def.name = def.signature.name;
   def.metadata = def.signature.metadata;
   def.parent = &parser.Current();
@@ -157,23 +157,18 @@ void CopyToSemicolon(QrexParser& parser, const std::string& atEnd, const char* p
 
 // Type and name of a $var or $typedef.
 struct Declaration {
-  TypeCode type;
-  std::string name;
-  const char* begin;    // of the type
-  const char* nameEnd;  // what stands behind the name is copied as it is
-  size_t suffixSize;    // of the array suffixes behind the name
+  const char* begin;  // of the type
+  ParsedType parsed;
 
   Declaration(QrexParser& parser, bool reflected, std::string_view what) : begin(parser.current.text.begin) {
-    if (!parser.ParseTypeWithName(type, &name, true, nullptr, reflected)) {
-      parser.Fail(std::string(what) + " expected when read " + Printed(parser.current));
-    }
-    nameEnd = parser.lastNameEnd;
-    suffixSize = parser.lastSuffixSize;
+    std::optional<ParsedType> found = parser.ParseTypeWithName(Naming::Required, reflected);
+    if (!found) parser.Fail(std::string(what) + " expected when read " + Printed(parser.current));
+    parsed = std::move(*found);
   }
 
   // "T name" without the array suffixes: the source's own are copied.
   void WriteTo(QrexParser& parser, std::string_view prefix) const {
-    parser.out << prefix << TypeText(std::string_view(type).substr(suffixSize)) << " " << name;
+    parser.out << prefix << TypeText(std::string_view(parsed.type).substr(parsed.suffixSize)) << " " << parsed.name;
     parser.Flush();
   }
 };
@@ -181,13 +176,13 @@ struct Declaration {
 template <typename Def>
 Def& AddDeclared(QrexParser& parser, const DeclaredFlags& flags, const Declaration& declaration,
                  std::string_view keyword) {
-  if (NameSpaceElement* found = parser.Current().Lookup(declaration.name)) {
-    parser.FailConflict(keyword, declaration.name, *found);
+  if (NameSpaceElement* found = parser.Current().Lookup(declaration.parsed.name)) {
+    parser.FailConflict(keyword, declaration.parsed.name, *found);
   }
   auto made = std::make_unique<Def>(parser.file, parser.SourcePosition());
   Def& def = *made;
-  def.name = declaration.name;
-  def.type = declaration.type;
+  def.name = declaration.parsed.name;
+  def.type = declaration.parsed.type;
   flags.Set(def);
   parser.Current().Add(std::move(made));
   return def;
@@ -201,8 +196,9 @@ void ParseGlobalVar(QrexParser& parser) {
   const Declaration declaration(parser, flags.reflected, "Variable declaration");
   parser.CheckNotExported(AddDeclared<GlobalVarDef>(parser, flags, declaration, "var"));
   declaration.WriteTo(parser, "");
-  parser.DropTo(declaration.nameEnd);
-  CopyToSemicolon(parser, "Missing semicolon after definition of variable " + declaration.name, declaration.begin);
+  parser.DropTo(declaration.parsed.nameEnd);
+  CopyToSemicolon(parser, "Missing semicolon after definition of variable " + declaration.parsed.name,
+                  declaration.begin);
 }
 
 void ParseTypedef(QrexParser& parser) {
@@ -212,9 +208,9 @@ void ParseTypedef(QrexParser& parser) {
   const auto& def = AddDeclared<TypedefDef>(parser, flags, declaration, "typedef");
   parser.CheckPublicHeader(def);
   if (!flags.isExtern) declaration.WriteTo(parser, "typedef ");
-  parser.DropTo(declaration.nameEnd);
+  parser.DropTo(declaration.parsed.nameEnd);
   parser.CheckMetadata(def);
-  CopyToSemicolon(parser, "Missing semicolon after typedef " + declaration.name, declaration.begin);
+  CopyToSemicolon(parser, "Missing semicolon after typedef " + declaration.parsed.name, declaration.begin);
   parser.out << "\ninline vesk::ConstStringZ GetTypedefName_" << def.name << "()\n";
   {
     Block body(parser.out);

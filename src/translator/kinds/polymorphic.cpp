@@ -45,11 +45,9 @@ class Dispatch {
 
   const VariantDef* VariantOf(const FunctionArg& argument) const {
     NameSpace& root = *m_def.owner.rootNameSpace;
-    uint32_t decorators = 0;
-    std::string_view code = SkipDecorators(argument.type, root, decorators);
-    if (static_cast<uint8_t>(code.front()) == kOpReference) code = SkipDecorators(code.substr(1), root, decorators);
-    if (static_cast<uint8_t>(code.front()) != kOpVariant) return nullptr;
-    return dynamic_cast<const VariantDef*>(NamedElement(code, root));
+    TypeView type = WithoutDecorators(argument.type, root).type;
+    if (type.Op() == kOpReference) type = WithoutDecorators(type.Inner(), root).type;
+    return type.Op() == kOpVariant ? dynamic_cast<const VariantDef*>(NamedElement(type, root)) : nullptr;
   }
 
   void WriteLevel(size_t depth) {
@@ -68,7 +66,7 @@ class Dispatch {
     m_out << "default: vxAssertUnreachable();\n}\n";
   }
 
-  // Of the overload for the items that the levels stand at.
+  // Of the overload for the current item of each level.
   void WriteCall() {
     m_out << (m_isVoid ? "" : "return ") << m_def.name << "(";
     auto level = m_levels.begin();

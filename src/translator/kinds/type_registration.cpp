@@ -12,15 +12,13 @@ void ParseType(QrexParser& parser) {
   bool registered = parser.ParseExportModifier();
   bool reflected = registered;
   if (parser.Is(kShiftLeft)) parser.ParseQualifierFlags(reflected, registered, " >> on $type");
-  TypeCode code;
-  if (!parser.ParseTypeWithName(code, nullptr, false, nullptr, reflected)) {
-    parser.Fail("Type expected when read " + Printed(parser.current));
-  }
-  const std::string type = TypeText(code);
+  const std::optional<ParsedType> parsed = parser.ParseTypeWithName(Naming::None, reflected);
+  if (!parsed) parser.Fail("Type expected when read " + Printed(parser.current));
+  const std::string type = TypeText(parsed->type);
   const Project& project = parser.GetProject();
   const std::string api =
       registered && project.targetType == TargetType::DynamicLinkLibrary ? project.name + "_API " : std::string();
-  if (registered) parser.file.typeRegistrations.push_back({code, &parser.Current()});
+  if (registered) parser.file.typeRegistrations.push_back({parsed->type, &parser.Current()});
   parser.out << api << "vesk::ReflectionByteCode _GetReflected(" << type << " const*);\n";
   parser.out << api << "vesk::TypeOps const& _GetTypeOps(" << type << " const*);\n";
   parser.Flush();

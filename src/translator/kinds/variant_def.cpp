@@ -76,14 +76,14 @@ bool VariantDef::HasSerialise() const {
 
 bool VariantDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
 
-bool VariantDef::ItemVisits(const VariantItem& item, bool (*test)(std::string_view, NameSpace&)) const {
+bool VariantDef::ItemVisits(const VariantItem& item, bool (*test)(TypeView, NameSpace&)) const {
   NameSpace& root = *owner.rootNameSpace;
   if (!item.isStruct) return test(item.type, root);
   return std::any_of(item.fields.begin(), item.fields.end(),
                      [&](const ClassField& field) { return test(field.type, root); });
 }
 
-bool VariantDef::AnyItemVisits(Memo& memo, bool (*test)(std::string_view, NameSpace&)) const {
+bool VariantDef::AnyItemVisits(Memo& memo, bool (*test)(TypeView, NameSpace&)) const {
   if (memo == Memo::NotComputed) {
     memo = Memo::BeingComputed;
     const bool any =

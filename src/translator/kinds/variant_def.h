@@ -28,14 +28,9 @@ struct VariantItem {
 
 class VariantDef : public RecordedElement, public TypeBehaviour {
  public:
-  VariantDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, Category::Variant) {
-    traitsKind = TraitsKind::Variant;
-  }
-  std::string_view GetKeyword() const override { return "variant"; }
-  std::string_view GetReflectedKindName() const override { return "Variant"; }
+  VariantDef(ScannedFile& owner, const char* position) : RecordedElement(owner, position, DeclKind::Variant) {}
   bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined && m_reflected; }
   void WriteReflectedDefinition(TextWriter& out) override;
-  DeclStatus GetDeclStatus() const override { return status; }
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
   bool ContainsMetaData() const override;
 
@@ -43,7 +38,7 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
   bool CanSerialise() const override;  // as a type of items and fields
   bool IsIObjectVisitable() const override;
   bool IsPrefVisitable() const override;
-  bool ItemVisits(const VariantItem& item, bool (*test)(std::string_view, NameSpace&)) const;
+  bool ItemVisits(const VariantItem& item, bool (*test)(TypeView, NameSpace&)) const;
   bool AllVoid() const;
   bool WritesToStream() const { return qualifiers.os != TriState::Off; }
   uint32_t TypeOpsBits() const;
@@ -56,7 +51,7 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
   enum class Memo { NotComputed, BeingComputed, No, Yes };
   mutable Memo m_hasSerialise = Memo::NotComputed;
   mutable Memo m_visitsObjects = Memo::NotComputed, m_visitsPrefs = Memo::NotComputed;
-  bool AnyItemVisits(Memo& memo, bool (*test)(std::string_view, NameSpace&)) const;
+  bool AnyItemVisits(Memo& memo, bool (*test)(TypeView, NameSpace&)) const;
 };
 
 }  // namespace qrex

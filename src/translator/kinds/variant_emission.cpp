@@ -178,7 +178,7 @@ class VariantTail {
   }
 
  private:
-  // switch(_tag) over the items; what `writeCase` writes for each stands behind "case N : ".
+  // switch(_tag) over the items; `writeCase` writes what follows "case N : ".
   void WriteSwitch(const std::function<std::string(const VariantItem&)>& composeCase, std::string_view last = {}) {
     m_out << "switch(_tag)\n";
     Block cases(m_out);
@@ -311,7 +311,7 @@ class VariantTail {
         "default: vxAssert(0);\n");
   }
 
-  void WriteVisit(std::string_view what, std::string_view visitor, bool (*test)(std::string_view, NameSpace&)) {
+  void WriteVisit(std::string_view what, std::string_view visitor, bool (*test)(TypeView, NameSpace&)) {
     WriteText(m_out, "inline void $0::Visit$1(vesk::$2& _v) const\n", {m_name, what, visitor});
     Block body(m_out);
     bool any = false;

@@ -23,7 +23,7 @@ class VariantStatement {
   void ReadDefault();
   void ReadItem();
   void ReadStruct(VariantItem& item);
-  void ReadTypeAndName(TypeCode& type, std::string& name, bool nameRequired);
+  ParsedType ReadTypeAndName(Naming naming);
 
   QrexParser& m_parser;
   ClassDef* const m_enclosing;
@@ -82,19 +82,20 @@ void VariantStatement::ReadDefault() {
   m_parser.Advance();
 }
 
-void VariantStatement::ReadTypeAndName(TypeCode& type, std::string& name, bool nameRequired) {
-  bool followedByParen = false;
-  if (!m_parser.ParseTypeWithName(type, &name, nameRequired, &followedByParen, m_def->m_reflected) || followedByParen) {
-    m_parser.Fail("Syntax error : " + Printed(m_parser.current));
-  }
+ParsedType VariantStatement::ReadTypeAndName(Naming naming) {
+  std::optional<ParsedType> parsed = m_parser.ParseTypeWithName(naming, m_def->m_reflected);
+  if (!parsed || parsed->followedByParen) m_parser.Fail("Syntax error : " + Printed(m_parser.current));
+  return std::move(*parsed);
 }
 
 void VariantStatement::ReadStruct(VariantItem& item) {
   item.isStruct = true;
   while (!m_parser.Is(kCloseBrace)) {
     if (m_parser.Is(kEndOfText)) m_parser.Fail("Met EOS before read matching brace for struct within $variant block");
+    ParsedType parsed = ReadTypeAndName(Naming::Required);
     ClassField& field = item.fields.emplace_back();
-    ReadTypeAndName(field.type, field.name, true);
+    field.name = std::move(parsed.name);
+    field.type = std::move(parsed.type);
     if (!m_parser.Accept(kSemicolon)) {
       m_parser.Fail("; expected after type definition when read " + Printed(m_parser.current));
     }
@@ -110,7 +111,9 @@ void VariantStatement::ReadItem() {
   if (m_parser.Accept(kOpenBrace)) {
     ReadStruct(*item);
   } else {
-    ReadTypeAndName(item->type, item->name, false);
+    ParsedType parsed = ReadTypeAndName(Naming::Optional);
+    item->type = std::move(parsed.type);
+    item->name = std::move(parsed.name);
     item->typeText = TypeText(item->type);
     item->isVoid = IsVoid(item->type);
   }

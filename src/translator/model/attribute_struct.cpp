@@ -6,11 +6,8 @@ namespace qrex {
 
 namespace {
 
-constexpr char kChar8Code[] = {kOpChar8};
-constexpr char kChar16Code[] = {kOpChar16};
-
 // The negation of an unsigned value happens in the signed type of its width.
-std::string_view NegationCast(uint8_t op) {
+std::string_view NegationCast(TypeOp op) {
   switch (op) {
     case kOpUInt8:
       return "(vesk::int8)";
@@ -26,82 +23,91 @@ std::string_view NegationCast(uint8_t op) {
 }
 
 // Element types whose operators inside a proxy call accessors that the proxy must forward.
-bool NeedsForwarders(uint8_t op) {
+bool NeedsForwarders(TypeOp op) {
   return op == kOpString8 || op == kOpString16 || op == kOpClass || op == kOpVector || op == kOpDynArray ||
          op == kOpArray || op == kOpMap;
 }
 
-bool IsForwardedScalar(uint8_t op) {
+bool IsForwardedScalar(TypeOp op) {
   return op <= kOpChar16 || op == kOpEnum || op == kOpVariant || op == kOpPtr || op == kOpPref || op == kOpCref;
 }
 
 }  // namespace
 
-std::string_view VectorElement(std::string_view code) {
-  switch (static_cast<uint8_t>(code.front())) {
-    case kOpString8:
-      return {kChar8Code, 1};
-    case kOpString16:
-      return {kChar16Code, 1};
-    default:
-      return code.substr(1);
-  }
+bool IsVectorLike(TypeView type) {
+  return type.Op() == kOpVector || type.Op() == kOpString8 || type.Op() == kOpString16;
 }
 
-const ClassDef* ModelOfType(std::string_view code, NameSpace& root) {
-  if (static_cast<uint8_t>(code.front()) != kOpClass) return nullptr;
-  const auto* element = NamedElement(code, root);
+TypeCode VectorElement(TypeView type) {
+  if (type.Op() == kOpVector) return TypeCode(type.Inner().Code());
+  TypeCode element;
+  AppendOp(element, type.Op() == kOpString8 ? kOpChar8 : kOpChar16);
+  return element;
+}
+
+const ClassDef* ModelOfType(TypeView type, NameSpace& root) {
+  if (type.Op() != kOpClass) return nullptr;
+  const auto* element = NamedElement(type, root);
   if (!element || element->category != Category::Class) return nullptr;
   const auto* def = static_cast<const ClassDef*>(element);
   return def->IsPureModel() ? def : nullptr;
 }
 
-void AttributeWriter::WriteStruct(const std::string& className, std::string_view type, const std::string& attributeName,
+void AttributeWriter::WriteStruct(const std::string& className, TypeView type, const std::string& attributeName,
                                   const std::string& accessorName, const std::string& memberName, bool readOnly) {
   const std::string arguments = "(" + className + "," + attributeName + ")";
   m_out << "struct\n{\n";
   {
     IndentScope indent(m_out, 4);
-    WriteOperators({className, 0, "ATTRIB_CAST" + arguments, "CONST_ATTRIB_CAST" + arguments, attributeName,
-                    accessorName, memberName, false, readOnly},
+    WriteOperators({.className = className,
+                    .self = "ATTRIB_CAST" + arguments,
+                    .constSelf = "CONST_ATTRIB_CAST" + arguments,
+                    .attribute = attributeName,
+                    .accessor = accessorName,
+                    .member = memberName,
+                    .readOnly = readOnly},
                    type);
   }
   m_out << "} " << memberName << ";\n";
 }
 
-void AttributeWriter::WriteOperators(Scope scope, std::string_view type) {
-  uint32_t decorators = 0;
-  const std::string_view code = SkipDecorators(type, m_root, decorators);
-  const uint8_t op = static_cast<uint8_t>(code.front());
-  scope.readOnly = scope.readOnly || (decorators & kHasConst);
-  WriteConversions(scope, TypeText(type), (decorators & kHasOffsettable) != 0);
+void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
+  const Undecorated undecorated = WithoutDecorators(type, m_root);
+  const TypeView inner = undecorated.type;
+  const TypeOp op = inner.Op();
+  scope.readOnly = scope.readOnly || undecorated.Has(kHasConst);
+  WriteConversions(scope, TypeText(type), undecorated.Has(kHasOffsettable));
 
-  if (decorators & kHasAssignable) return WritePlain(scope, type, code);
-  if (decorators & kHasOffsettable) return WriteOffset(scope, type, op);
-  if (const ClassDef* model = ModelOfType(code, m_root)) return WriteModel(scope, *model);
-  if (IsVectorLike(op)) return WriteVector(scope, VectorElement(code));
+  if (undecorated.Has(kHasAssignable)) return WritePlain(scope, type, inner);
+  if (undecorated.Has(kHasOffsettable)) return WriteOffset(scope, type, op);
+  if (const ClassDef* model = ModelOfType(inner, m_root)) return WriteModel(scope, *model);
+  if (IsVectorLike(inner)) {
+    const TypeCode element = VectorElement(inner);
+    return WriteVector(scope, element);
+  }
   switch (op) {
     case kOpArray:
-      return WriteProxy(scope, PathElement::Index(ArraySize(code)), "vesk::ssize_t", ArrayElement(code));
+      return WriteProxy(scope, PathElement::Index(inner.Count()), "vesk::ssize_t", inner.Inner());
     case kOpDynArray:
-      return WriteProxy(scope, PathElement::Index(-1), "vesk::ssize_t", code.substr(1));
+      return WriteProxy(scope, PathElement::Index(-1), "vesk::ssize_t", inner.Inner());
     case kOpMap:
-      return WriteProxy(scope, PathElement::Key(MapKey(code)), TypeText(MapKey(code)), MapValue(code));
+      return WriteProxy(scope, PathElement::Key(inner.Key()), TypeText(inner.Key()), inner.Value());
     case kOpSet:
-      return WriteKeySet(scope, code.substr(1));
+      return WriteKeySet(scope, inner.Inner());
     default:
-      return WritePlain(scope, type, code);
+      return WritePlain(scope, type, inner);
   }
 }
 
 void AttributeWriter::WriteConversions(const Scope& scope, std::string_view typeText, bool isOffsettable) {
   const std::string key = scope.Key();
-  WriteText(m_out, "operator $0$1() const { return $2->Get$3($4); }\n",
-            {typeText, m_byValue || isOffsettable ? "" : " const&", scope.constSelf, scope.accessor, key});
-  if (m_byValue) return;
+  WriteText(
+      m_out, "operator $0$1() const { return $2->Get$3($4); }\n",
+      {typeText, m_access == Access::Methods || isOffsettable ? "" : " const&", scope.constSelf, scope.accessor, key});
+  if (m_access == Access::Methods) return;
   WriteText(m_out, "$0 const& read() const { return $1->Get$2($3); }\n",
             {typeText, scope.constSelf, scope.accessor, key});
-  if (m_hasWrite) {
+  if (m_access == Access::Barriers) {
     WriteText(m_out, "$0 & write() { return $1->Write$2($3); }\n", {typeText, scope.self, scope.accessor, key});
   }
   WriteText(m_out,
@@ -122,7 +128,7 @@ void AttributeWriter::WriteModel(const Scope& scope, const ClassDef& model) {
   }
 }
 
-void AttributeWriter::WriteOffset(const Scope& scope, std::string_view type, uint8_t op) {
+void AttributeWriter::WriteOffset(const Scope& scope, TypeView type, TypeOp op) {
   if (scope.readOnly) return;
   WriteText(m_out,
             "void operator+=($0) { $1->Offset$2($3$4); }\n"
@@ -131,10 +137,10 @@ void AttributeWriter::WriteOffset(const Scope& scope, std::string_view type, uin
              NegationCast(op)});
 }
 
-void AttributeWriter::WritePlain(const Scope& scope, std::string_view type, std::string_view code) {
+void AttributeWriter::WritePlain(const Scope& scope, TypeView type, TypeView inner) {
   const std::string typeText = TypeText(type);
   const std::string get = scope.constSelf + "->Get" + scope.accessor + "(" + scope.Key() + ")";
-  const uint8_t op = static_cast<uint8_t>(code.front());
+  const TypeOp op = inner.Op();
   if (op == kOpPointer || op == kOpPtr || op == kOpPref || op == kOpCref) {
     WriteText(m_out, "$0 operator->() const { return $1; }\n", {typeText, get});
   }
@@ -142,20 +148,20 @@ void AttributeWriter::WritePlain(const Scope& scope, std::string_view type, std:
     WriteText(m_out,
               "$0 operator*() const { return *$1; }\n"
               "vesk::ptr<$0 > Get() const { return $1.Get(); }\n",
-              {TypeText(code.substr(1)), get});
+              {TypeText(inner.Inner()), get});
   }
   if (op == kOpCref) {
     WriteText(m_out,
               "$0& operator*() const { return *$1; }\n"
               "$0* Get() const { return $1.Get(); }\n",
-              {TypeText(code.substr(1)), get});
+              {TypeText(inner.Inner()), get});
   }
   if (scope.readOnly) return;
   WriteText(m_out, "void operator=($0) { $1->Set$2($3_v); }\n",
             {ConstReferenceText(type, "_v"), scope.self, scope.accessor, WithComma(scope.Key())});
 }
 
-void AttributeWriter::WriteVector(const Scope& scope, std::string_view element) {
+void AttributeWriter::WriteVector(const Scope& scope, TypeView element) {
   if (scope.readOnly) return;
   const std::string type = TypeText(element);
   const std::string key = WithComma(scope.Key());
@@ -177,7 +183,7 @@ void AttributeWriter::WriteVector(const Scope& scope, std::string_view element) 
   write("clear()", "erase_range(0,model().size());");
 }
 
-void AttributeWriter::WriteKeySet(const Scope& scope, std::string_view key) {
+void AttributeWriter::WriteKeySet(const Scope& scope, TypeView key) {
   if (scope.readOnly) return;
   const std::string type = TypeText(key);
   auto write = [&](std::string_view member, std::string_view accessor) {
@@ -193,7 +199,7 @@ void AttributeWriter::WriteKeySet(const Scope& scope, std::string_view key) {
 // An element can't be a member of the union, so operator[] answers a small struct of the enclosing object and the
 // index.
 void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const std::string& keyType,
-                                 std::string_view elementType) {
+                                 TypeView elementType) {
   m_path.Push(std::move(element));
   const std::string proxy = scope.accessor + "Element";
   const std::string index = ParameterName(scope.depth);
@@ -201,12 +207,18 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
   {
     IndentScope indent(m_out, 4);
     WriteText(m_out, "$0($1* _self, $2 _k) : _self(_self),$3(_k) {}\n", {proxy, scope.className, keyType, index});
-    uint32_t decorators = 0;
-    const std::string_view code = SkipDecorators(elementType, m_root, decorators);
-    if (NeedsForwarders(static_cast<uint8_t>(code.front()))) {
+    if (NeedsForwarders(WithoutDecorators(elementType, m_root).type.Op())) {
       WriteForwarders(scope.depth, scope.depth, elementType, proxy, scope.readOnly);
     }
-    WriteOperators({proxy, scope.depth + 1, "_self", "_self", "", proxy, proxy, true, scope.readOnly}, elementType);
+    WriteOperators({.className = proxy,
+                    .depth = scope.depth + 1,
+                    .self = "_self",
+                    .constSelf = "_self",
+                    .accessor = proxy,
+                    .member = proxy,
+                    .inProxy = true,
+                    .readOnly = scope.readOnly},
+                   elementType);
     WriteText(m_out, "$0* _self;\n$1 $2;\n", {scope.className, keyType, index});
   }
   m_out << "};\n";
@@ -226,11 +238,11 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
 
 // --- Forwarders: a proxy offers the accessors that the operators inside it call, with its own index filled in.
 
-void AttributeWriter::WriteForwarders(size_t first, size_t last, std::string_view type, const std::string& name,
+void AttributeWriter::WriteForwarders(size_t first, size_t last, TypeView type, const std::string& name,
                                       bool readOnly) {
-  uint32_t decorators = 0;
-  const std::string_view code = SkipDecorators(type, m_root, decorators);
-  const uint8_t op = static_cast<uint8_t>(code.front());
+  const Undecorated undecorated = WithoutDecorators(type, m_root);
+  const TypeView inner = undecorated.type;
+  const TypeOp op = inner.Op();
   const std::string parameters = ForwardedParameters(first, last);
   const std::string arguments = FieldPath::Arguments(first, last + 1);
   WriteText(m_out,
@@ -240,53 +252,52 @@ void AttributeWriter::WriteForwarders(size_t first, size_t last, std::string_vie
             "$3 const& Get$0($1) const { return _self->Get$0($2); }\n",
             {name, parameters, arguments, TypeText(type)});
 
-  if ((decorators & kHasAssignable) || IsForwardedScalar(op)) {
+  if (undecorated.Has(kHasAssignable) || IsForwardedScalar(op)) {
     if (readOnly) return;
     WriteText(m_out, "void $0$1($2$3) { _self->$0$1($4_v); }\n",
-              {decorators & kHasOffsettable ? "Offset" : "Set", name, WithComma(parameters),
+              {undecorated.Has(kHasOffsettable) ? "Offset" : "Set", name, WithComma(parameters),
                ConstReferenceText(type, "_v"), WithComma(arguments)});
-  } else if (IsVectorLike(op)) {
+  } else if (IsVectorLike(inner)) {
     if (readOnly) return;
     WriteText(m_out,
               "void CreateInto$0($1vesk::ssize_t _i,$2 const* _src,vesk::ssize_t _n)\n"
               "{\n    _self->CreateInto$0($3_i,_src,_n);\n}\n"
               "void DeleteFrom$0($1vesk::ssize_t _i1,vesk::ssize_t _i2)\n"
               "{\n    _self->DeleteFrom$0($3_i1,_i2);\n}\n",
-              {name, WithComma(parameters), TypeText(VectorElement(code)), WithComma(arguments)});
+              {name, WithComma(parameters), TypeText(VectorElement(inner)), WithComma(arguments)});
   } else if (op == kOpClass) {
-    const NameSpaceElement* element = NamedElement(code, m_root);
+    const NameSpaceElement* element = NamedElement(inner, m_root);
     if (!element || element->category != Category::Class) return;
     for (const ModelField* field : static_cast<const ClassDef*>(element)->m_modelFields) {
       if (!field->IsDropped()) WriteForwarders(first, last, field->m_type, name + field->m_name, readOnly);
     }
   } else if (op == kOpArray) {
-    WriteContainerForwarders(first, last, PathElement::Index(ArraySize(code)), ArrayElement(code), name, readOnly);
+    WriteContainerForwarders(first, last, PathElement::Index(inner.Count()), inner.Inner(), name, readOnly);
   } else if (op == kOpDynArray) {
-    WriteContainerForwarders(first, last, PathElement::Index(-1), code.substr(1), name, readOnly);
+    WriteContainerForwarders(first, last, PathElement::Index(-1), inner.Inner(), name, readOnly);
   } else if (op == kOpMap) {
-    WriteContainerForwarders(first, last, PathElement::Key(MapKey(code)), MapValue(code), name, readOnly);
+    WriteContainerForwarders(first, last, PathElement::Key(inner.Key()), inner.Value(), name, readOnly);
   } else if (op == kOpSet) {
     if (readOnly) return;
     for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {
       WriteText(m_out,
                 "bool $0$1($2$3 const& _key)\n"
                 "{\n    return _self->$0$1($4_key);\n}\n",
-                {verb, name, WithComma(parameters), TypeText(code.substr(1)), WithComma(arguments)});
+                {verb, name, WithComma(parameters), TypeText(inner.Inner()), WithComma(arguments)});
     }
   } else {
-    TraceWriter() << "*bc = " << op << "\n";
+    TraceWriter() << "*bc = " << static_cast<uint8_t>(op) << "\n";
   }
 }
 
-void AttributeWriter::WriteContainerForwarders(size_t first, size_t last, PathElement element,
-                                               std::string_view elementType, const std::string& name, bool readOnly) {
+void AttributeWriter::WriteContainerForwarders(size_t first, size_t last, PathElement element, TypeView elementType,
+                                               const std::string& name, bool readOnly) {
   const std::string parameters = ForwardedParameters(first, last);
   const std::string arguments = FieldPath::Arguments(first, last + 1);
   WriteText(m_out, "vesk::ssize_t Get$0Size($1) const { return _self->Get$0Size($2); }\n",
             {name, parameters, arguments});
   m_path.Push(std::move(element));
-  const std::string_view code = SkipMetadata(elementType);
-  if (static_cast<uint8_t>(code.front()) <= kOpString16) {
+  if (elementType.WithoutMetadata().IsBuiltIn()) {
     const std::string deeper = ForwardedParameters(first, last + 1);
     const std::string deeperArguments = FieldPath::Arguments(first, last + 2);
     const std::string type = TypeText(elementType);

@@ -12,18 +12,25 @@
 
 namespace qrex {
 
-// --- What accessors and attribute structs ask of a type; `code` is behind metadata, typedefs and decorators.
-inline bool IsVectorLike(uint8_t op) { return op == kOpVector || op == kOpString8 || op == kOpString16; }
-std::string_view VectorElement(std::string_view code);                // of a vector or a string
-const ClassDef* ModelOfType(std::string_view code, NameSpace& root);  // a class of kind model; or null
+// --- What accessors and attribute structs ask of a type; `type` has no metadata, typedef or decorator at its head.
+bool IsVectorLike(TypeView type);
+TypeCode VectorElement(TypeView type);                        // of a vector or a string
+const ClassDef* ModelOfType(TypeView type, NameSpace& root);  // a class of kind model; or null
+
+// What generated code goes through to get at a field or an attribute.
+enum class Access {
+  Struct,      // the field itself, in the struct that holds it
+  Barriers,    // the field, behind a read or write barrier
+  Operations,  // the genop_ functions of the runtime
+  Methods      // the methods of an interface, which return by value
+};
 
 class AttributeWriter {
  public:
-  // `byValue`: the accessors behind the struct answer by value; `hasWrite`: they include Write.
-  AttributeWriter(TextWriter& out, NameSpace& root, bool byValue, bool hasWrite)
-      : m_out(out), m_root(root), m_byValue(byValue), m_hasWrite(hasWrite) {}
+  // `access`: of the accessors that the operators call.
+  AttributeWriter(TextWriter& out, NameSpace& root, Access access) : m_out(out), m_root(root), m_access(access) {}
 
-  void WriteStruct(const std::string& className, std::string_view type, const std::string& attributeName,
+  void WriteStruct(const std::string& className, TypeView type, const std::string& attributeName,
                    const std::string& accessorName, const std::string& memberName, bool readOnly);
 
  private:
@@ -31,34 +38,33 @@ class AttributeWriter {
   struct Scope {
     std::string className;
     size_t depth = 0;
-    std::string self, constSelf;
-    std::string attribute;
-    std::string accessor;
-    std::string member;
+    std::string self = {}, constSelf = {};
+    std::string attribute = {};
+    std::string accessor = {};
+    std::string member = {};
     bool inProxy = false;
     bool readOnly = false;
     std::string Key() const { return inProxy ? ParameterName(depth - 1) : std::string(); }
   };
 
-  void WriteOperators(Scope scope, std::string_view type);
+  void WriteOperators(Scope scope, TypeView type);
   void WriteConversions(const Scope& scope, std::string_view typeText, bool isOffsettable);
   void WriteModel(const Scope& scope, const ClassDef& model);
-  void WriteOffset(const Scope& scope, std::string_view type, uint8_t op);
-  void WritePlain(const Scope& scope, std::string_view type, std::string_view code);
-  void WriteVector(const Scope& scope, std::string_view element);
-  void WriteKeySet(const Scope& scope, std::string_view key);
-  void WriteProxy(const Scope& scope, PathElement element, const std::string& keyType, std::string_view elementType);
+  void WriteOffset(const Scope& scope, TypeView type, TypeOp op);
+  void WritePlain(const Scope& scope, TypeView type, TypeView inner);
+  void WriteVector(const Scope& scope, TypeView element);
+  void WriteKeySet(const Scope& scope, TypeView key);
+  void WriteProxy(const Scope& scope, PathElement element, const std::string& keyType, TypeView elementType);
 
-  void WriteForwarders(size_t first, size_t last, std::string_view type, const std::string& name, bool readOnly);
-  void WriteContainerForwarders(size_t first, size_t last, PathElement element, std::string_view elementType,
+  void WriteForwarders(size_t first, size_t last, TypeView type, const std::string& name, bool readOnly);
+  void WriteContainerForwarders(size_t first, size_t last, PathElement element, TypeView elementType,
                                 const std::string& name, bool readOnly);
   std::string ForwardedParameters(size_t first, size_t last) const { return m_path.Parameters(first + 1, last + 1); }
 
   TextWriter& m_out;
   NameSpace& m_root;
   FieldPath m_path;  // indexes and keys only
-  const bool m_byValue;
-  const bool m_hasWrite;
+  const Access m_access;
 };
 
 }  // namespace qrex

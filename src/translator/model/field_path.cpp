@@ -24,15 +24,12 @@ size_t CompactSize(int64_t value) {
   return bytes.size();
 }
 
-uint8_t KeyOp(const PathElement& element) {
-  const std::string_view code = SkipMetadata(element.key);
-  return code.empty() ? 0 : static_cast<uint8_t>(code.front());
-}
+TypeOp KeyOp(const PathElement& element) { return TypeView(element.key).WithoutMetadata().Op(); }
 
 // 0 for a key without a known size.
 size_t KeySize(const PathElement& element) {
   static constexpr size_t kSizes[] = {0, 1, 1, 2, 4, 8, 16, 1, 2, 4, 8, 16, 4, 8, 1, 2};
-  const uint8_t op = KeyOp(element);
+  const TypeOp op = KeyOp(element);
   if (op == kOpEnum) return 4;
   return op < std::size(kSizes) ? kSizes[op] : 0;
 }
@@ -42,7 +39,7 @@ std::string_view KeyShortName(const PathElement& element) {
   static constexpr std::string_view kNames[] = {"",        "bool",    "int8",   "int16",  "int32",  "int64",
                                                 "int128",  "uint8",   "uint16", "uint32", "uint64", "uint128",
                                                 "float32", "float64", "char8",  "char16"};
-  const uint8_t op = KeyOp(element);
+  const TypeOp op = KeyOp(element);
   return op == kOpEnum ? "vesk::int32" : kNames[op];
 }
 

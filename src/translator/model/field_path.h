@@ -8,7 +8,7 @@
 #include <vector>
 
 #include "translator/symbols/name_space.h"
-#include "translator/types/type_code.h"
+#include "translator/types/type_view.h"
 
 namespace qrex {
 
@@ -20,7 +20,7 @@ struct PathElement {
 
   static PathElement Constant(size_t position) { return {Kind::Constant, static_cast<int64_t>(position), {}}; }
   static PathElement Index(int64_t bound) { return {Kind::Index, bound, {}}; }
-  static PathElement Key(std::string_view type) { return {Kind::Key, -1, TypeCode(type)}; }
+  static PathElement Key(TypeView type) { return {Kind::Key, -1, TypeCode(type.Code())}; }
 };
 
 class FieldPath {

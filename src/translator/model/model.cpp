@@ -26,14 +26,11 @@ void WriteDefaultConstructor(TextWriter& out, const ClassDef& def) {
   out << def.ModelStructName() << "()";
   bool first = true;
   for (const ModelField* field : NonDropped(def)) {
-    uint32_t decorators = 0;
-    const std::string_view type = SkipDecorators(field->m_type, *def.owner.rootNameSpace, decorators);
-    const uint8_t op = static_cast<uint8_t>(type.front());
-    const bool isScalar = op >= kOpBool && op <= kOpChar16;
-    if (!isScalar && op != kOpEnum && op != kOpPointer) continue;
+    const TypeView type = WithoutDecorators(field->m_type, *def.owner.rootNameSpace).type;
+    if (!type.IsScalar() && type.Op() != kOpEnum && type.Op() != kOpPointer) continue;
     out << (first ? " : " : ",") << field->m_name;
     first = false;
-    if (op == kOpEnum) {
+    if (type.Op() == kOpEnum) {
       out << "((" << TypeText(type) << ")0)";
     } else {
       out << "(0)";
@@ -110,8 +107,8 @@ void WriteStructMembers(TextWriter& out, const ClassDef& def) {
     out << "void Serialise(vesk::Archive&) const;\n"
            "void Deserialise(vesk::InputArchive&);\n";
   }
-  if (def.IsMixin() || def.IsTemplate() || def.m_isAnonymous) {
-    WriteVisiting(out, def, TextPlace::Inline);
+  if (def.MemberPlacement() == Placement::InClass || def.m_isAnonymous) {
+    WriteVisiting(out, def, Placement::InClass);
   } else {
     WriteVisitingDeclarations(out, def);
   }
@@ -140,9 +137,9 @@ void WriteModelFieldsAndAccessors(TextWriter& out, const ClassDef& def) {
 
 // --- Archives
 
-void WriteSerialise(TextWriter& out, const ClassDef& def, TextPlace place) {
+void WriteSerialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
-  if (place == TextPlace::Inline) {
+  if (placement == Placement::InClass) {
     out << "template<typename Archive> void Serialise(Archive& _ar) const\n";
   } else {
     out << "void " << ModelScope(def) << "::Serialise(vesk::Archive& _ar) const\n";
@@ -194,10 +191,10 @@ void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& 
 
 }  // namespace
 
-void WriteDeserialise(TextWriter& out, const ClassDef& def, TextPlace place) {
+void WriteDeserialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
   out << "void ";
-  if (place == TextPlace::OutOfLine) out << ModelScope(def) << "::";
+  if (placement == Placement::OutOfClass) out << ModelScope(def) << "::";
   out << "Deserialise(vesk::InputArchive& _ar)\n";
   Block body(out);
   if (def.m_numModelSchema < 2) {
@@ -214,11 +211,11 @@ void WriteDeserialise(TextWriter& out, const ClassDef& def, TextPlace place) {
 
 // --- Visiting
 
-void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place) {
+void WriteVisiting(TextWriter& out, const ClassDef& def, Placement placement) {
   NameSpace& root = *def.owner.rootNameSpace;
   const auto fields = NonDropped(def);
   std::string heading = "void ";
-  if (place == TextPlace::OutOfLine) {
+  if (placement == Placement::OutOfClass) {
     heading = def.TemplatePrefix() + "void " + ModelScope(def) + def.TemplateArgs() + "::";
   }
   if (!def.GenerateOps()) {
@@ -226,7 +223,7 @@ void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place) {
     for (const ModelField* field : fields) out << "vesk::DataSourceEvict(&" << field->m_name << ");";
     out << "}\n";
   }
-  auto writeVisit = [&](std::string_view function, bool (*isVisitable)(std::string_view, NameSpace&)) {
+  auto writeVisit = [&](std::string_view function, bool (*isVisitable)(TypeView, NameSpace&)) {
     out << heading << function << "& _v) const {";
     bool any = false;
     for (const ModelField* field : fields) {
@@ -253,6 +250,7 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
   const std::string mixin = def.name + "_model_mixin";
   const std::string type = model.QualifiedModelStructName() + model.TemplateArgs();
   const bool operations = def.GenerateOps() && model.qualifiers.genop != TriState::Off;
+  const Access access = operations ? Access::Operations : Access::Barriers;
   out << "template <typename BC" << (def.IsTemplate() ? "," + def.m_templateArgList : "") << ">\n";
   out << "struct " << mixin << " : public BC\n";
   Block body(out, ";");
@@ -268,11 +266,11 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
       << "}\n";
   out << "void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}\n"
          "void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}\n";
-  WriteModelMixinAccessors(out, def, model, operations);
+  WriteModelMixinAccessors(out, def, model, access);
   if (model.GetNumNonDroppedModelFields() > 0) {
     out << "union\n";
     Block attributes(out, ";");
-    WriteModelMixinAttributeStructs(out, def, model, operations);
+    WriteModelMixinAttributeStructs(out, def, model, access);
   }
   WriteText(out,
             "typedef $0 model_type;\n"
@@ -303,7 +301,7 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
 namespace {
 
 bool KeepsDataSourceRsn(const ClassDef& def) {
-  if (def.IsMixin() || def.IsTemplate()) return false;
+  if (def.MemberPlacement() == Placement::InClass) return false;
   return (def.m_inheritsModel && def.CanSerialiseEmbeddedModel()) ||
          (def.m_referencedModel && def.m_referencedModel->CanSerialiseEmbeddedModel());
 }
@@ -364,18 +362,10 @@ void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
   out << "return _os;\n";
 }
 
-std::string_view MapOrSetIn(std::string_view code) {
-  for (;;) {
-    code = SkipMetadata(code);
-    const uint8_t op = static_cast<uint8_t>(code.empty() ? 0 : code.front());
-    if (op >= kOpVolatile && op <= kOpOffsettable) {
-      code.remove_prefix(1);
-    } else if (op == kOpArray) {
-      code = ArrayElement(code);
-    } else {
-      return op == kOpMap || op == kOpSet ? code : std::string_view();
-    }
-  }
+TypeView MapOrSetIn(TypeView type) {
+  type = type.WithoutMetadata();
+  while (type.IsDecorator() || type.Op() == kOpArray) type = type.Inner().WithoutMetadata();
+  return type.Op() == kOpMap || type.Op() == kOpSet ? type : TypeView();
 }
 
 std::vector<MixedModelField> AllModelFields(const ClassDef& def) {

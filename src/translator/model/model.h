@@ -9,18 +9,18 @@ namespace qrex {
 
 class QrexParser;
 
-// On the `{` or the `<<` of the block; leaves it on the closing `}`. Constructor text is written while it is read.
-// `expansion`: what will be generated of the fields.
+// The current token is the `{` or `<<` of the block, afterwards the closing `}`. Constructor text is written while it
+// is read. `expansion`: what will be generated of the fields.
 void ParseModelBlock(QrexParser& parser, ClassDef& def, Expansion expansion);
 
-// The whole of a model struct: heading, block (read here), members, "};\n". On the `{` or `<<`; leaves it on the `}`.
+// The whole of a model struct: heading, block (read here), members, "};\n". The current token is the `{` or `<<`,
+// afterwards the `}`.
 void ParseModelStruct(QrexParser& parser, ClassDef& def);
 
-enum class TextPlace { Inline, OutOfLine };
 void WriteModelFieldsAndAccessors(TextWriter& out, const ClassDef& def);  // of a model in a class body
-void WriteSerialise(TextWriter& out, const ClassDef& def, TextPlace place);
-void WriteDeserialise(TextWriter& out, const ClassDef& def, TextPlace place);
-void WriteVisiting(TextWriter& out, const ClassDef& def, TextPlace place);
+void WriteSerialise(TextWriter& out, const ClassDef& def, Placement placement);
+void WriteDeserialise(TextWriter& out, const ClassDef& def, Placement placement);
+void WriteVisiting(TextWriter& out, const ClassDef& def, Placement placement);
 void WriteVisitingDeclarations(TextWriter& out, const ClassDef& def);
 void WriteModelMixin(TextWriter& out, const ClassDef& def);
 
@@ -30,9 +30,9 @@ void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def);
 void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def);
 
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def);  // when `os` is unset
-// Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or an empty view.
-std::string_view MapOrSetIn(std::string_view code);
-inline bool HoldsMapOrSet(std::string_view code) { return !MapOrSetIn(code).empty(); }
+// Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or none.
+TypeView MapOrSetIn(TypeView type);
+inline bool HoldsMapOrSet(TypeView type) { return !MapOrSetIn(type).Empty(); }
 // The rows of `_modelFields`; returns their number.
 size_t WriteModelFieldRows(TextWriter& out, const ClassDef& def);
 // The fields that those rows describe: the class's own, then those of its mixins.

@@ -13,31 +13,30 @@ namespace {
 // barrier and touch the field.
 class AccessorWriter {
  public:
-  AccessorWriter(TextWriter& out, const ClassDef& model, bool operations, bool implementsIObject, bool structMode)
+  AccessorWriter(TextWriter& out, const ClassDef& model, Access access, bool implementsIObject)
       : m_out(out),
         m_model(model),
         m_root(*model.owner.rootNameSpace),
-        m_operations(operations),
-        m_implementsIObject(implementsIObject),
-        m_barriers(!structMode),
-        m_structMode(structMode) {}
+        m_access(access),
+        m_implementsIObject(implementsIObject) {}
 
   void Write() {
     for (size_t i = 0; i < m_model.m_modelFields.size(); ++i) {
       const ModelField& field = *m_model.m_modelFields[i];
       if (field.IsDropped()) continue;
-      WriteField(PathElement::Constant(i), field.m_type, field.m_name, (m_structMode ? "" : "_model_.") + field.m_name);
+      WriteField(PathElement::Constant(i), field.m_type, field.m_name,
+                 (m_access == Access::Struct ? "" : "_model_.") + field.m_name);
     }
   }
 
  private:
-  void WriteField(PathElement element, std::string_view type, const std::string& name, const std::string& expression);
-  void WriteByType(std::string_view type, const std::string& name, const std::string& expression);
+  void WriteField(PathElement element, TypeView type, const std::string& name, const std::string& expression);
+  void WriteByType(TypeView type, const std::string& name, const std::string& expression);
   void WritePathFunctions(const std::string& name);
-  void WriteSet(std::string_view type, const std::string& name, const std::string& expression);
-  void WriteOffset(std::string_view type, const std::string& name, const std::string& expression);
-  void WriteVector(std::string_view element, const std::string& name, const std::string& expression);
-  void WriteKeySet(std::string_view key, const std::string& name, const std::string& expression);
+  void WriteSet(TypeView type, const std::string& name, const std::string& expression);
+  void WriteOffset(TypeView type, const std::string& name, const std::string& expression);
+  void WriteVector(TypeView element, const std::string& name, const std::string& expression);
+  void WriteKeySet(TypeView key, const std::string& name, const std::string& expression);
 
   std::string PathCall(const std::string& name) const { return "Get" + name + "Path(" + m_path.Arguments() + ")"; }
   std::string ReadBarrier(const std::string& name, const std::string& expression) const;
@@ -45,29 +44,23 @@ class AccessorWriter {
   std::string GenopCall(std::string_view function, const std::string& name, const std::string& expression,
                         std::string_view rest) const;
   // "genop_XMVector" and the like: by what the elements hold.
-  std::string VectorOperation(std::string_view verb, std::string_view element) const;
-  bool IsMovable(std::string_view type) const {
-    uint32_t decorators = 0;
-    SkipDecorators(type, m_root, decorators);
-    return (decorators & kHasMovable) != 0;
-  }
+  std::string VectorOperation(std::string_view verb, TypeView element) const;
+  bool IsMovable(TypeView type) const { return WithoutDecorators(type, m_root).Has(kHasMovable); }
 
   TextWriter& m_out;
   const ClassDef& m_model;
   NameSpace& m_root;
   FieldPath m_path;
-  const bool m_operations;
+  const Access m_access;
   const bool m_implementsIObject;
-  const bool m_barriers;
-  const bool m_structMode;
 };
 
 constexpr std::string_view kConstFinal = "static_cast<const typename BC::FinalClass*>(this)";
 constexpr std::string_view kFinal = "static_cast<typename BC::FinalClass*>(this)";
 
 std::string AccessorWriter::ReadBarrier(const std::string& name, const std::string& expression) const {
-  if (!m_barriers) return {};
-  if (m_operations) {
+  if (m_access == Access::Struct) return {};
+  if (m_access == Access::Operations) {
     return "vesk::IndepFieldReadBarrier(" + std::string(kConstFinal) + "," + PathCall(name) + "); ";
   }
   return "vesk::DataSourceReadBarrier(&" + expression + "," +
@@ -76,7 +69,7 @@ std::string AccessorWriter::ReadBarrier(const std::string& name, const std::stri
 }
 
 std::string AccessorWriter::WriteBarrier(const std::string& expression) const {
-  if (!m_barriers || m_operations) return {};
+  if (m_access != Access::Barriers) return {};
   return "vesk::DataSourceWriteBarrier(&" + expression + "," +
          std::string(m_implementsIObject ? kFinal : "vesk::null") + ",\"" + m_model.name + "::" + expression + "\"); ";
 }
@@ -97,7 +90,7 @@ void AccessorWriter::WritePathFunctions(const std::string& name) {
         << "Path(_path" << comma << arguments << "); return _path; }\n";
 }
 
-void AccessorWriter::WriteField(PathElement element, std::string_view type, const std::string& name,
+void AccessorWriter::WriteField(PathElement element, TypeView type, const std::string& name,
                                 const std::string& expression) {
   m_path.Push(std::move(element));
   m_out << "\n";
@@ -111,47 +104,49 @@ void AccessorWriter::WriteField(PathElement element, std::string_view type, cons
   m_path.Pop();
 }
 
-void AccessorWriter::WriteByType(std::string_view type, const std::string& name, const std::string& expression) {
-  uint32_t decorators = 0;
-  const std::string_view code = SkipDecorators(type, m_root, decorators);
-  const uint8_t op = static_cast<uint8_t>(code.front());
-  auto writeElement = [&](PathElement element, std::string_view elementType) {
+void AccessorWriter::WriteByType(TypeView type, const std::string& name, const std::string& expression) {
+  const Undecorated undecorated = WithoutDecorators(type, m_root);
+  const TypeView inner = undecorated.type;
+  auto writeElement = [&](PathElement element, TypeView elementType) {
     const std::string index = ParameterName(m_path.ParameterCount());
     WriteField(std::move(element), elementType, name + "Element", expression + "[" + index + "]");
   };
-  if (decorators & kHasAssignable) return WriteSet(type, name, expression);
-  if (decorators & kHasOffsettable) return WriteOffset(type, name, expression);
-  if (const ClassDef* inner = ModelOfType(code, m_root)) {
-    for (size_t i = 0; i < inner->m_modelFields.size(); ++i) {
-      const ModelField& field = *inner->m_modelFields[i];
+  if (undecorated.Has(kHasAssignable)) return WriteSet(type, name, expression);
+  if (undecorated.Has(kHasOffsettable)) return WriteOffset(type, name, expression);
+  if (const ClassDef* model = ModelOfType(inner, m_root)) {
+    for (size_t i = 0; i < model->m_modelFields.size(); ++i) {
+      const ModelField& field = *model->m_modelFields[i];
       if (field.IsDropped()) continue;
       WriteField(PathElement::Constant(i), field.m_type, name + field.m_name, expression + "." + field.m_name);
     }
     return;
   }
-  if (IsVectorLike(op)) return WriteVector(VectorElement(code), name, expression);
-  switch (op) {
+  if (IsVectorLike(inner)) {
+    const TypeCode element = VectorElement(inner);
+    return WriteVector(element, name, expression);
+  }
+  switch (inner.Op()) {
     case kOpArray:
-      return writeElement(PathElement::Index(ArraySize(code)), ArrayElement(code));
+      return writeElement(PathElement::Index(inner.Count()), inner.Inner());
     case kOpDynArray:
-      return writeElement(PathElement::Index(-1), code.substr(1));
+      return writeElement(PathElement::Index(-1), inner.Inner());
     case kOpMap:
-      return writeElement(PathElement::Key(MapKey(code)), MapValue(code));
+      return writeElement(PathElement::Key(inner.Key()), inner.Value());
     case kOpSet:
-      return WriteKeySet(code.substr(1), name, expression);
+      return WriteKeySet(inner.Inner(), name, expression);
     default:
       return WriteSet(type, name, expression);
   }
 }
 
-void AccessorWriter::WriteSet(std::string_view type, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
   const std::string parameters = m_path.Parameters();
-  if (!m_operations) {
+  if (m_access != Access::Operations) {
     WriteText(m_out, "$0& Write$1($2) { $3 return $4; }\n",
               {TypeText(type), name, parameters, WriteBarrier(expression), expression});
   }
   m_out << "void Set" << name << "(" << WithComma(parameters) << ConstReferenceText(type, "_v") << ") { ";
-  if (m_operations) {
+  if (m_access == Access::Operations) {
     const std::string_view function = IsMovable(type)                 ? "genop_AssignPref"
                                       : NeedsVisitPrefs(type, m_root) ? "genop_Assign_VisitPrefs"
                                                                       : "genop_Assign";
@@ -162,9 +157,9 @@ void AccessorWriter::WriteSet(std::string_view type, const std::string& name, co
   m_out << " }\n";
 }
 
-void AccessorWriter::WriteOffset(std::string_view type, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteOffset(TypeView type, const std::string& name, const std::string& expression) {
   m_out << "void Offset" << name << "(" << WithComma(m_path.Parameters()) << ConstReferenceText(type, "_v") << ") { ";
-  if (m_operations) {
+  if (m_access == Access::Operations) {
     m_out << GenopCall("genop_OffsetValue", name, expression, ",_v);");
   } else {
     m_out << WriteBarrier(expression) << expression << " += _v;";
@@ -172,19 +167,19 @@ void AccessorWriter::WriteOffset(std::string_view type, const std::string& name,
   m_out << " }\n";
 }
 
-std::string AccessorWriter::VectorOperation(std::string_view verb, std::string_view element) const {
+std::string AccessorWriter::VectorOperation(std::string_view verb, TypeView element) const {
   const std::string function = "genop_" + std::string(verb);
   if (IsMovable(element)) return function + "MVector";
   return function + (NeedsVisitPrefs(element, m_root) ? "Vector_VisitPrefs" : "Vector");
 }
 
-void AccessorWriter::WriteVector(std::string_view element, const std::string& name, const std::string& expression) {
+void AccessorWriter::WriteVector(TypeView element, const std::string& name, const std::string& expression) {
   const std::string parameters = WithComma(m_path.Parameters());
   WriteText(m_out, "void CreateInto$0($1vesk::ssize_t _i,$2 const* _src,vesk::ssize_t _n)\n",
             {name, parameters, TypeText(element)});
   {
     Block body(m_out);
-    if (m_operations) {
+    if (m_access == Access::Operations) {
       m_out << GenopCall(VectorOperation("CreateInto", element), name, expression, ",_i,_src,_n);\n");
     } else {
       WriteText(m_out, "$0$1.insert($1.begin()+_i,_src,_src+_n);\n", {WriteBarrier(expression), expression});
@@ -192,15 +187,15 @@ void AccessorWriter::WriteVector(std::string_view element, const std::string& na
   }
   WriteText(m_out, "void DeleteFrom$0($1vesk::ssize_t _i1,vesk::ssize_t _i2)\n", {name, parameters});
   Block body(m_out);
-  if (m_operations) {
+  if (m_access == Access::Operations) {
     m_out << GenopCall(VectorOperation("DeleteFrom", element), name, expression, ",_i1,_i2);\n");
   } else {
     WriteText(m_out, "$0$1.erase(_i1,_i2-_i1);\n", {WriteBarrier(expression), expression});
   }
 }
 
-void AccessorWriter::WriteKeySet(std::string_view key, const std::string& name, const std::string& expression) {
-  if (IsMovable(key) && m_operations) {
+void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const std::string& expression) {
+  if (IsMovable(key) && m_access == Access::Operations) {
     const std::string parameters = WithComma(m_path.Parameters());
     for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {
       WriteText(m_out, "bool $0$1($2$3 const& _v) { return $4 }\n",
@@ -215,7 +210,7 @@ void AccessorWriter::WriteKeySet(std::string_view key, const std::string& name, 
   WritePathFunctions(element);
   auto write = [&](std::string_view verb, std::string_view operation, std::string_view member) {
     WriteText(m_out, "bool $0$1($2) { ", {verb, name, m_path.Parameters()});
-    if (m_operations) {
+    if (m_access == Access::Operations) {
       m_out << "return " << GenopCall(operation, element, expression, "," + index + ");");
     } else {
       WriteText(m_out, "$0return $1.$2($3);", {WriteBarrier(expression), expression, member, index});
@@ -230,17 +225,17 @@ void AccessorWriter::WriteKeySet(std::string_view key, const std::string& name, 
 }  // namespace
 
 void WriteModelStructAccessors(TextWriter& out, const ClassDef& def) {
-  AccessorWriter(out, def, false, def.m_implementsIObject, true).Write();
+  AccessorWriter(out, def, Access::Struct, def.m_implementsIObject).Write();
 }
 
-void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, bool operations) {
-  AccessorWriter(out, model, operations, def.m_implementsIObject, false).Write();
+void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
+  AccessorWriter(out, model, access, def.m_implementsIObject).Write();
 }
 
-void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, bool operations) {
+void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
   for (const ModelField* field : model.m_modelFields) {
     if (field->IsDropped()) continue;
-    AttributeWriter writer(out, *model.owner.rootNameSpace, false, !operations);
+    AttributeWriter writer(out, *model.owner.rootNameSpace, access);
     writer.WriteStruct(def.name + "_model_mixin", field->m_type, field->m_name, field->m_name, field->m_name, false);
   }
 }

@@ -2,13 +2,14 @@
 #pragma once
 
 #include "translator/declared/class_def.h"
+#include "translator/model/attribute_struct.h"
 
 namespace qrex {
 
 void WriteModelStructAccessors(TextWriter& out, const ClassDef& def);  // in the struct that holds the fields
 // In the mixin of `def`, over the fields of `model` (the referenced model or `def`), with "_model_." ahead of each.
-void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, bool operations);
-// The attribute structs that stand in the mixin's union.
-void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, bool operations);
+void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access);
+// The attribute structs in the mixin's union.
+void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access);
 
 }  // namespace qrex

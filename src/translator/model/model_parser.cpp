@@ -91,10 +91,11 @@ void ModelBlock::ParseFields(bool dropped) {
   while (!m_parser.Is(kDollar) && !m_parser.Is(kDollarDollar) && !m_parser.Is(kCloseBrace) &&
          !m_parser.Is("explicit")) {
     if (m_parser.Is(kEndOfText)) m_parser.Fail("Met EOS before read matching brace for $model block");
+    std::optional<ParsedType> parsed = m_parser.ParseTypeWithName(Naming::Required, strict);
+    if (!parsed) m_parser.FailExpected("identifier");
     auto field = std::make_unique<ModelField>();
-    if (!m_parser.ParseTypeWithName(field->m_type, &field->m_name, true, nullptr, strict)) {
-      m_parser.FailExpected("identifier");
-    }
+    field->m_name = std::move(parsed->name);
+    field->m_type = std::move(parsed->type);
     if (!m_parser.Is(kSemicolon)) {
       m_parser.Fail("; expected after field declaration when read " + Printed(m_parser.current));
     }
@@ -113,10 +114,10 @@ void ModelBlock::CheckField(const ModelField& field, bool dropped) {
   context.isMutable = true;
   context.inModel = true;
   context.serialisable = m_def.m_implementsIPersistable;
-  std::string message;
-  if (!CheckType(field.m_type, m_parser.Root(), context, message)) m_parser.Fail(message);
+  const std::string_view fault = TypeFault(field.m_type, m_parser.Root(), context);
+  if (!fault.empty()) m_parser.Fail(std::string(fault));
   if (dropped) return;  // it has no accessors
-  message = ExpansionFault(field.m_type, m_parser.Root(), m_expansion, &m_def);
+  const std::string message = ExpansionFault(field.m_type, m_parser.Root(), m_expansion, &m_def);
   if (!message.empty()) m_parser.Fail("Field " + field.m_name + " : " + message);
 }
 
@@ -265,7 +266,7 @@ void ModelBlock::ParseEvolveEntry(std::vector<Evolution>& evolutions) {
   m_parser.Advance();
 }
 
-// Behind the `(`; stands behind the `)` afterwards.
+// The current token is behind the `(`, afterwards behind the `)`.
 void ModelBlock::ParseEvolveArguments(ModelField& field, Evolution& evolution) {
   if (m_parser.Accept(kCloseParen)) return;
   for (;;) {

@@ -13,32 +13,25 @@ class TypeExpansion {
   void Enter(const ClassDef* def) { m_path.push_back(def); }
 
   // `intoAnyClass`: the model of any class is followed, not only that of a class of kind model.
-  std::string Fault(std::string_view type, size_t depth, bool intoAnyClass) {
-    uint32_t decorators = 0;
-    type = SkipDecorators(type, m_root, decorators);
+  std::string Fault(TypeView type, size_t depth, bool intoAnyClass) {
+    const Undecorated undecorated = WithoutDecorators(type, m_root);
+    type = undecorated.type;
     if (depth > kMaxDepth || ++m_steps > kMaxSteps) return "type nested too deeply";
     const bool isMethods = m_expansion == Expansion::Methods;
     const uint32_t ending = isMethods ? ~uint32_t{kHasConst} : uint32_t{kHasAssignable};
-    if (decorators & ending) return {};
-    std::string_view element;
-    switch (static_cast<uint8_t>(type.front())) {
+    if (undecorated.decorators & ending) return {};
+    switch (type.Op()) {
       case kOpClass:
         return ClassFault(type, depth, intoAnyClass);
       case kOpVector:
-        return isMethods ? Fault(type.substr(1), depth + 1, true) : "";
+        return isMethods ? Fault(type.Inner(), depth + 1, true) : "";
       case kOpDynArray:
-        element = type.substr(1);
-        break;
       case kOpArray:
-        element = ArrayElement(type);
-        break;
       case kOpMap:
-        element = MapValue(type);
-        break;
+        return isMethods ? "" : Fault(type.Inner(), depth + 1, m_expansion == Expansion::AttributeStructs);
       default:
         return {};
     }
-    return isMethods ? "" : Fault(element, depth + 1, m_expansion == Expansion::AttributeStructs);
   }
 
  private:
@@ -46,7 +39,7 @@ class TypeExpansion {
   static constexpr size_t kMaxDepth = 50;
   static constexpr size_t kMaxSteps = 100000;
 
-  std::string ClassFault(std::string_view type, size_t depth, bool intoAnyClass) {
+  std::string ClassFault(TypeView type, size_t depth, bool intoAnyClass) {
     const NameSpaceElement* element = NamedElement(type, m_root);
     if (!element || element->category != Category::Class) return {};
     const auto* def = static_cast<const ClassDef*>(element);
@@ -69,7 +62,7 @@ class TypeExpansion {
 
 }  // namespace
 
-std::string ExpansionFault(std::string_view type, NameSpace& root, Expansion expansion, const ClassDef* self) {
+std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self) {
   TypeExpansion way(root, expansion);
   if (self) way.Enter(self);
   return way.Fault(type, 0, expansion == Expansion::Methods);

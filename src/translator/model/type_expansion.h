@@ -1,5 +1,5 @@
 // How far generated text follows a type: into the fields of models, and on into the elements of containers. The text
-// that comes of it is finite only where the way never leads back to a model that it passed.
+// is finite only if no model is reached again from within itself.
 #pragma once
 
 #include <string>
@@ -18,6 +18,6 @@ enum class Expansion {
 
 // Why a type can't be expanded ("$model Node contains itself"); empty when it can. `self`: the class whose model is
 // just being read or expanded, or null.
-std::string ExpansionFault(std::string_view type, NameSpace& root, Expansion expansion, const ClassDef* self);
+std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self);
 
 }  // namespace qrex

@@ -1,7 +1,5 @@
 #include "translator/reader/code_block.h"
 
-#include <algorithm>
-
 #include "translator/declared/class_def.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -9,21 +7,16 @@ namespace qrex {
 
 namespace {
 
-constexpr std::string_view kWordsInCode[] = {"this", "class", "struct", "mixin", "interface", "enum", "variant", "new"};
-
 // At the `$`; true when the word behind it was dealt with.
 bool ReplaceItem(QrexParser& parser, ClassDef& def) {
   LexScanner ahead = parser.scanner;
   const LexToken word = NextToken(ahead);
-  if (std::find(std::begin(kWordsInCode), std::end(kWordsInCode), word.text.View()) == std::end(kWordsInCode)) {
-    return false;
-  }
   for (const ClassKeyword& keyword : parser.Keywords().classLevel) {
-    if (!word.Is(keyword.word)) continue;
+    if (keyword.scope != Scope::BodyAndCode || !word.Is(keyword.word)) continue;
     parser.CopyToCurrent();
     parser.Advance();
     keyword.parse(parser, def);
-    if (!keyword.advancesItself) parser.Advance();
+    if (keyword.endsOn == EndsOn::LastToken) parser.Advance();
     return true;
   }
   return false;
@@ -144,10 +137,9 @@ std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::st
   return name + " = " + code.TextTo(end);
 }
 
-std::string_view PassingSuffix(std::string_view type) {
-  const std::string_view code = SkipMetadata(type);
-  const uint8_t op = code.empty() ? 0 : static_cast<uint8_t>(code.front());
-  return (op >= kOpBool && op <= kOpChar16) || op == kOpPointer ? "" : " const&";
+std::string_view PassingSuffix(TypeView type) {
+  type = type.WithoutMetadata();
+  return type.IsScalar() || type.Op() == kOpPointer ? "" : " const&";
 }
 
 NodeHead ReadNodeHead(QrexParser& parser, const ClassDef& def) {

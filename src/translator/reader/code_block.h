@@ -4,6 +4,8 @@
 #include <string>
 #include <string_view>
 
+#include "translator/types/type_view.h"
+
 namespace qrex {
 
 class ClassDef;
@@ -18,9 +20,9 @@ std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::st
 std::string ReadBraceContent(QrexParser& parser, const ClassDef& def);
 
 // By value are numbers, characters and pointers; " const&" for all other types.
-std::string_view PassingSuffix(std::string_view type);
+std::string_view PassingSuffix(TypeView type);
 
-// What stands ahead of a cached or dependent declaration: `-`, `^`.
+// The marks before a cached or dependent declaration: `-`, `^`.
 struct NodeHead {
   bool reflected = false;
   bool hard = false;

@@ -144,7 +144,7 @@ void QrexParser::Dispatch() {
   for (const Keyword& keyword : m_keywords.fileLevel) {
     if (!Is(keyword.word)) continue;
     keyword.parse(*this);
-    if (!keyword.advancesItself) Advance();
+    if (keyword.endsOn == EndsOn::LastToken) Advance();
     return;
   }
   Fail("'$" + Printed(current) + "' is not a valid directive");

@@ -50,6 +50,28 @@ class QrexParserOutputStream : public IOutputStream {
   const char* m_copied = nullptr;
 };
 
+enum class Naming { None, Optional, Required };  // may, or must, a name stand behind the type
+
+struct ParsedType {
+  TypeCode type;
+  std::string name;               // empty: there is none
+  bool followedByParen = false;   // behind the name stands a `(`
+  const char* nameEnd = nullptr;  // in the expanded text: behind the name, or where it could stand
+  size_t suffixSize = 0;          // of the part of `type` that stands for the arrays behind the name
+};
+
+struct SignatureRules {
+  bool constAllowed = false;  // behind the arguments
+  bool directions = false;    // each argument begins with [in], [out], ...; a method returns nothing
+  bool polymorphic = false;   // an argument may stand in [ ]
+  bool reflected = false;     // all types must be understood completely
+};
+
+struct ParsedMember {
+  bool isAttribute = false;     // has no argument list
+  FunctionSignature signature;  // of an attribute, its name and its type as returnType
+};
+
 class QrexParser : public ExpressionParser {
  public:
   QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded,
@@ -93,21 +115,18 @@ class QrexParser : public ExpressionParser {
   [[noreturn]] void FailRepeated(const NameSpaceElement& old, const NameSpaceElement& element);
   // Into the current name space, or into the class that encloses it.
   void Enter(std::unique_ptr<NameSpaceElement> element, ClassDef* enclosing);
-  // A forward declaration stands in the current name space, also from a class body, unless a thing of its name does
+  // Enters a forward declaration into the current name space, also from a class body, unless its name is known there
   // already. `old` is what the look-up of one that is not nested found.
   void EnterForward(std::unique_ptr<NameSpaceElement> element, const NameSpaceElement* old, const ClassDef* enclosing);
   void RequireSemicolonAfter(const NameSpaceElement& element);  // "; expected after definition of ..."
   void SeeDeclaration(const NameSpaceElement& element);
   void RequireIObjectImport();  // "@import of IObject.h required"
 
-  // --- Types (type_parser.cpp). `reflected`: the type must be understood completely.
-  bool ParseTypeWithName(TypeCode& type, std::string* name, bool nameRequired, bool* followedByParen, bool reflected);
-  bool ParseBaseType(TypeCode& type, bool reflected);
-  void ParseFunctionSignature(FunctionSignature& signature, bool constAllowed, bool directionsRequired,
-                              bool polymorphicAllowed, bool reflected);
-  void ParseMethodOrAttribute(bool constAllowed, bool& isAttribute, FunctionSignature& signature, bool ipc,
-                              bool reflected);
-  void ParseFunctionArg(FunctionArg& arg, bool directionsRequired, bool reflected);
+  // --- Types (type_parser.cpp). `reflected`: the type must be understood completely. None: no type begins here.
+  std::optional<ParsedType> ParseTypeWithName(Naming naming, bool reflected);
+  FunctionSignature ParseFunctionSignature(const SignatureRules& rules);
+  ParsedMember ParseMethodOrAttribute(const SignatureRules& rules);
+  FunctionArg ParseFunctionArg(const SignatureRules& rules);
   std::string ReadArgumentText();            // behind the current token, to the top-level `,` or `)` that ends it
   void ParseMetadataList(std::string& out);  // `[` is current; behind `]` afterwards
   void ParseMetadataValue(std::string& out);
@@ -135,8 +154,6 @@ class QrexParser : public ExpressionParser {
   const Project& GetProject() const { return *file.file.project; }
   const KeywordTables& Keywords() const { return m_keywords; }
 
-  const char* lastNameEnd = nullptr;  // behind the name that ParseTypeWithName read last
-  size_t lastSuffixSize = 0;          // of the part of its code that stands for the arrays behind the name
   Warnings warnings;
   int nesting = 0;  // of declarations inside declarations, see NestingGuard
   ScannedFile& file;
@@ -159,13 +176,14 @@ class QrexParser : public ExpressionParser {
   void EnterNameSpace(const std::string& name, const char* position);
   void CloseBrace();
   void Dispatch();
-  bool ParseDecoratorType(TypeCode& type, bool reflected);
-  bool ParseSuffixedType(TypeCode& type, bool reflected);
-  void ParseInnerType(TypeCode& type, bool reflected);
+  std::optional<TypeCode> ParseBaseType(bool reflected);
+  std::optional<TypeCode> ParseDecoratorType(bool reflected);
+  std::optional<TypeCode> ParseSuffixedType(bool reflected);
+  TypeCode ParseInnerType(bool reflected);
   void CheckPlatformDependent() const;
   TypeCode ParseArraySuffix();
-  void ParseArguments(FunctionSignature& signature, bool directionsRequired, bool polymorphicAllowed, bool reflected);
-  void ParseSignatureEnd(FunctionSignature& signature, bool constAllowed);
+  std::vector<FunctionArg> ParseArguments(const SignatureRules& rules);
+  void ParseSignatureEnd(FunctionSignature& signature, const SignatureRules& rules);
   size_t ParseMetadataValues(std::string& out, int32_t close, std::string_view expected, std::string_view exceeded);
 
   const KeywordTables& m_keywords;

@@ -1,5 +1,6 @@
 // The QrexParser operations on types, signatures and metadata.
 
+#include <array>
 #include <limits>
 
 #include "lex/literals.h"
@@ -11,110 +12,93 @@ namespace qrex {
 
 namespace {
 
-constexpr size_t kMaxMetadataValues = 31;
-
 struct TemplateName {
   std::string_view word;
-  std::string_view ops;  // the opcodes that it stands for, outermost first
+  std::array<TypeOp, 3> ops;  // what it stands for, outermost first; kOpVoid ends
+  bool IsDeprecated() const { return ops[1] != kOpVoid; }
 };
-constexpr char kMovableVector[] = {kOpVector, kOpMovable, kOpPref};
-constexpr char kSingleOps[] = {kOpSet,  kOpAssignable, kOpMovable, kOpOffsettable, kOpPtr, kOpOpenVariant, kOpPref,
-                               kOpCref, kOpVector,     kOpDeque,   kOpList,        kOpBag, kOpDynArray};
 constexpr TemplateName kTemplateNames[] = {
-    {"xset", {&kSingleOps[0], 1}},        {"mvector", {kMovableVector, 3}},     {"assignable", {&kSingleOps[1], 1}},
-    {"movable", {&kSingleOps[2], 1}},     {"offsettable", {&kSingleOps[3], 1}}, {"ptr", {&kSingleOps[4], 1}},
-    {"openvariant", {&kSingleOps[5], 1}}, {"pref", {&kSingleOps[6], 1}},        {"cref", {&kSingleOps[7], 1}},
-    {"xvector", {&kSingleOps[8], 1}},     {"xdeque", {&kSingleOps[9], 1}},      {"xlist", {&kSingleOps[10], 1}},
-    {"xbag", {&kSingleOps[11], 1}},       {"DynArray", {&kSingleOps[12], 1}},
+    {"xset", {kOpSet}},
+    {"mvector", {kOpVector, kOpMovable, kOpPref}},
+    {"assignable", {kOpAssignable}},
+    {"movable", {kOpMovable}},
+    {"offsettable", {kOpOffsettable}},
+    {"ptr", {kOpPtr}},
+    {"openvariant", {kOpOpenVariant}},
+    {"pref", {kOpPref}},
+    {"cref", {kOpCref}},
+    {"xvector", {kOpVector}},
+    {"xdeque", {kOpDeque}},
+    {"xlist", {kOpList}},
+    {"xbag", {kOpBag}},
+    {"DynArray", {kOpDynArray}},
 };
 
 constexpr std::string_view kPlatformDependent[] = {"char",     "short",   "int",      "long",  "__int8", "__int16",
                                                    "__int32",  "__int64", "__int128", "float", "double", "signed",
                                                    "unsigned", "DWORD",   "WORD",     "BYTE"};
 
-uint8_t OpcodeOf(Category category) {
-  switch (category) {
-    case Category::Typedef:
-      return kOpTypedef;
-    case Category::Interface:
-      return kOpInterface;
-    case Category::Class:
-      return kOpClass;
-    case Category::Functor:
-      return kOpFunctor;
-    case Category::GlobalFunction:
-      return kOpGlobalFunction;
-    case Category::Variant:
-      return kOpVariant;
-    case Category::Enum:
-      return kOpEnum;
-    default:
-      return kOpCppText;
-  }
-}
-
-void AppendInt32(std::string& out, uint32_t value) {
-  for (int i = 0; i < 4; ++i) out += static_cast<char>(value >> (8 * i));
-}
-
 }  // namespace
 
-void QrexParser::ParseInnerType(TypeCode& type, bool reflected) {
+TypeCode QrexParser::ParseInnerType(bool reflected) {
   NestingGuard guard(*this);
-  if (!ParseTypeWithName(type, nullptr, false, nullptr, reflected)) Fail("Syntax error : " + Printed(current));
+  std::optional<ParsedType> inner = ParseTypeWithName(Naming::None, reflected);
+  if (!inner) Fail("Syntax error : " + Printed(current));
+  return std::move(inner->type);
 }
 
-// The built-in names and templates; false when the word is none of them.
-bool QrexParser::ParseDecoratorType(TypeCode& type, bool reflected) {
+// The built-in names and templates.
+std::optional<TypeCode> QrexParser::ParseDecoratorType(bool reflected) {
+  TypeCode type;
   for (uint8_t op = kOpVoid; op <= kOpString16; ++op) {
-    if (!Is(BuiltInTypeName(op))) continue;
-    type += static_cast<char>(op);
+    const auto builtIn = static_cast<TypeOp>(op);
+    if (!Is(BuiltInTypeName(builtIn))) continue;
+    AppendOp(type, builtIn);
     Advance();
-    return true;
+    return type;
   }
-  if (Is("xstring")) {
-    type += static_cast<char>(kOpString8);
-    Advance();
-    return true;
+  if (AcceptWord("xstring")) {
+    AppendOp(type, kOpString8);
+    return type;
   }
   if (Is("xmap")) {
     Advance();
     Expect(kLess, "<");
-    type += static_cast<char>(kOpMap);
-    ParseInnerType(type, reflected);
+    AppendOp(type, kOpMap);
+    type += ParseInnerType(reflected);
     Expect(kComma, ",");
-    ParseInnerType(type, reflected);
+    type += ParseInnerType(reflected);
     SplitShiftRight();
     Expect(kGreater, ">");
-    return true;
+    return type;
   }
   for (const TemplateName& name : kTemplateNames) {
     if (!Is(name.word)) continue;
-    if (name.ops.size() > 1) {
+    if (name.IsDeprecated()) {
       ReportWarning(1005, "mvector<T> is deprecated - instead use xvector<movable<pref<T> > >");
     }
     Advance();
     Expect(kLess, "<");
-    type += name.ops;
-    ParseInnerType(type, reflected);
+    for (size_t i = 0; i < name.ops.size() && name.ops[i] != kOpVoid; ++i) AppendOp(type, name.ops[i]);
+    type += ParseInnerType(reflected);
     SplitShiftRight();
     Expect(kGreater, ">");
-    return true;
+    return type;
   }
-  return false;
+  return std::nullopt;
 }
 
-bool QrexParser::ParseBaseType(TypeCode& type, bool reflected) {
+std::optional<TypeCode> QrexParser::ParseBaseType(bool reflected) {
   const char* const begin = current.text.begin;  // `typename` belongs to the text of a type that stays C++
   AcceptWord("typename");
-  if (!Is(kIdentifier) && !Is(kColonColon)) return false;
+  if (!Is(kIdentifier) && !Is(kColonColon)) return std::nullopt;
   NameSpace* scope = Accept(kColonColon) ? &Root() : nullptr;
   NameSpaceElement* found = nullptr;
   for (bool isScoped = scope != nullptr;; isScoped = true) {
     if (!Is(kIdentifier)) FailExpected("identifier");
     if (!isScoped || (scope && scope->GetQualifiedName() == "vesk")) {
       if (!isScoped && reflected) CheckPlatformDependent();
-      if (ParseDecoratorType(type, reflected)) return true;
+      if (std::optional<TypeCode> type = ParseDecoratorType(reflected)) return type;
     }
     found = scope ? scope->Lookup(current.text.View()) : isScoped ? nullptr : FindName(current.text.View());
     if (reflected && !found) Fail("Unrecognised identifier : " + current.text.Text());
@@ -132,12 +116,11 @@ bool QrexParser::ParseBaseType(TypeCode& type, bool reflected) {
     scope = static_cast<NameSpace*>(found);
     Advance();
   }
-  if (found && found->category != Category::NameSpace && found->category != Category::GlobalVar) {
-    AppendNamedType(type, OpcodeOf(found->category), found->GetQualifiedName());
-  } else {
-    AppendNamedType(type, kOpCppText, std::string_view(begin, static_cast<size_t>(previous.text.end - begin)));
-  }
-  return true;
+  TypeCode type;
+  const TypeOp op = found ? found->kindTraits.op : kOpCppText;
+  const std::string_view text(begin, static_cast<size_t>(previous.text.end - begin));
+  AppendNamedType(type, op, op == kOpCppText ? text : found->GetQualifiedName());
+  return type;
 }
 
 void QrexParser::CheckPlatformDependent() const {
@@ -147,44 +130,41 @@ void QrexParser::CheckPlatformDependent() const {
 }
 
 // Optional `const`, the base type, then any of `*`, `const` and `: [metadata]`. The last suffix is the outermost.
-bool QrexParser::ParseSuffixedType(TypeCode& type, bool reflected) {
+std::optional<TypeCode> QrexParser::ParseSuffixedType(bool reflected) {
   const bool leadingConst = AcceptWord("const");
-  TypeCode base;
-  if (!ParseBaseType(base, reflected)) return false;
-  if (leadingConst) base.insert(0, 1, static_cast<char>(kOpConst));
+  std::optional<TypeCode> type = ParseBaseType(reflected);
+  if (!type) return type;
+  if (leadingConst) PrependOp(*type, kOpConst);
   for (;;) {
     if (Accept(kStar)) {
-      base.insert(0, 1, static_cast<char>(kOpPointer));
+      PrependOp(*type, kOpPointer);
     } else if (AcceptWord("const")) {
-      base.insert(0, 1, static_cast<char>(kOpConst));
-    } else if (Is(kColon)) {
-      Advance();
+      PrependOp(*type, kOpConst);
+    } else if (Accept(kColon)) {
       std::string metadata;
       ParseMetadataList(metadata);
-      base.insert(0, metadata);
+      type->insert(0, metadata);
     } else {
-      break;
+      return type;
     }
   }
-  type = std::move(base);
-  return true;
 }
 
-bool QrexParser::ParseTypeWithName(TypeCode& type, std::string* name, bool nameRequired, bool* followedByParen,
-                                   bool reflected) {
-  TypeCode base;
-  if (!ParseSuffixedType(base, reflected)) return false;
+std::optional<ParsedType> QrexParser::ParseTypeWithName(Naming naming, bool reflected) {
+  const std::optional<TypeCode> base = ParseSuffixedType(reflected);
+  if (!base) return std::nullopt;
+  ParsedType parsed;
   const bool isReference = Accept(kAnd);
-  if (name) {
+  if (naming != Naming::None) {
     if (Is(kIdentifier)) {
-      *name = ReadIdentifier();
-    } else if (nameRequired) {
+      parsed.name = ReadIdentifier();
+    } else if (naming == Naming::Required) {
       FailExpected("identifier");
     }
-    lastNameEnd = previous.text.end;
-    if (followedByParen) *followedByParen = Is(kOpenParen);
+    parsed.followedByParen = Is(kOpenParen);
   }
-  // Arrays stand outer dimension first; metadata that follows a dimension stands in front of its code.
+  parsed.nameEnd = previous.text.end;
+  // The outer dimension comes first in the code; metadata behind a dimension goes before that dimension's code.
   TypeCode dimensions, dimension;
   while (Is(kOpenBracket) || Is(kColon)) {
     if (Accept(kColon)) {
@@ -197,25 +177,28 @@ bool QrexParser::ParseTypeWithName(TypeCode& type, std::string* name, bool nameR
     dimensions += dimension;
     dimension = ParseArraySuffix();
   }
-  if (isReference) type += static_cast<char>(kOpReference);
   dimensions += dimension;
-  lastSuffixSize = isReference ? 0 : dimensions.size();
-  type += dimensions + base;
-  return true;
+  if (isReference) {
+    AppendOp(parsed.type, kOpReference);
+  } else {
+    parsed.suffixSize = dimensions.size();
+  }
+  parsed.type += dimensions;
+  parsed.type += *base;
+  return parsed;
 }
 
 TypeCode QrexParser::ParseArraySuffix() {
   TypeCode code;
   Advance();
   if (Accept(kCloseBracket)) {
-    code += static_cast<char>(kOpDynArray);
+    AppendOp(code, kOpDynArray);
     return code;
   }
   const int64_t size = ReadInt64();
   if (size <= 0 || static_cast<int32_t>(size) <= 0) Fail("Array size must be greater than zero");
   Expect(kCloseBracket, "]");
-  code += static_cast<char>(kOpArray);
-  AppendInt32(code, static_cast<uint32_t>(size));
+  AppendArray(code, static_cast<uint32_t>(size));
   return code;
 }
 
@@ -227,40 +210,34 @@ namespace {
   throw LexScannerException(std::move(message), position);
 }
 
-uint8_t Op(std::string_view code) { return code.empty() ? 0 : static_cast<uint8_t>(code.front()); }
-
 // What a remote call needs of an argument in each direction.
 void CheckDirection(const FunctionArg& arg, const char* position) {
-  std::string_view code = SkipMetadata(arg.type);
+  TypeView type = TypeView(arg.type).WithoutMetadata();
   const std::string& name = arg.name;
-  const bool isReference = Op(code) == kOpReference;
-  auto isConst = [&](std::string_view inner) { return Op(SkipMetadata(inner)) == kOpConst; };
+  const bool isReference = type.Op() == kOpReference;
+  auto innerIsConst = [&] { return type.Inner().WithoutMetadata().Op() == kOpConst; };
   switch (arg.direction) {
     case ArgDirection::In:
       if (isReference) {
-        code = SkipMetadata(code.substr(1));
-        if (Op(code) != kOpConst) FailAt(position, "in parameter " + name + " passed by reference");
+        type = type.Inner().WithoutMetadata();
+        if (type.Op() != kOpConst) FailAt(position, "in parameter " + name + " passed by reference");
       }
-      if (Op(code) == kOpConst) code = SkipMetadata(code.substr(1));
-      if (Op(code) == kOpPointer) FailAt(position, "in parameter " + name + " : cannot marshall pointer type");
+      if (type.Op() == kOpConst) type = type.Inner().WithoutMetadata();
+      if (type.Op() == kOpPointer) FailAt(position, "in parameter " + name + " : cannot marshall pointer type");
       break;
     case ArgDirection::Out:
     case ArgDirection::InOut:
       if (!isReference) FailAt(position, "out parameter " + name + " must be passed by reference");
-      if (isConst(code.substr(1))) {
-        FailAt(position, "out parameter " + name + " cannot be passed by const reference");
-      }
+      if (innerIsConst()) FailAt(position, "out parameter " + name + " cannot be passed by const reference");
       break;
     case ArgDirection::Copy:
-      if (Op(code) != kOpPointer) FailAt(position, "copy parameter " + name + " must be passed by pointer");
-      if (isConst(code.substr(1))) {
-        FailAt(position, "copy parameter " + name + " cannot be passed by pointer to const");
-      }
-      code = SkipMetadata(code.substr(1));
-      if (Op(code) == kOpReference) {
+      if (type.Op() != kOpPointer) FailAt(position, "copy parameter " + name + " must be passed by pointer");
+      if (innerIsConst()) FailAt(position, "copy parameter " + name + " cannot be passed by pointer to const");
+      type = type.Inner().WithoutMetadata();
+      if (type.Op() == kOpReference) {
         FailAt(position, "'copy' parameter " + name + " : cannot marshall reference type");
       }
-      if (Op(code) == kOpPointer) FailAt(position, "'copy' parameter " + name + " : cannot marshall pointer type");
+      if (type.Op() == kOpPointer) FailAt(position, "'copy' parameter " + name + " : cannot marshall pointer type");
       break;
     case ArgDirection::None:
       break;
@@ -269,8 +246,9 @@ void CheckDirection(const FunctionArg& arg, const char* position) {
 
 }  // namespace
 
-void QrexParser::ParseFunctionArg(FunctionArg& arg, bool directionsRequired, bool reflected) {
-  if (directionsRequired) {
+FunctionArg QrexParser::ParseFunctionArg(const SignatureRules& rules) {
+  FunctionArg arg;
+  if (rules.directions) {
     if (!Accept(kOpenBracket)) Fail("[in] or [out] expected when read " + Printed(current));
     static constexpr std::string_view kWords[] = {"", "in", "out", "inout", "copy"};
     for (size_t i = 1; i < std::size(kWords); ++i) {
@@ -281,10 +259,12 @@ void QrexParser::ParseFunctionArg(FunctionArg& arg, bool directionsRequired, boo
     Expect(kCloseBracket, "]");
   }
   const char* const position = current.text.begin;
-  if (!ParseTypeWithName(arg.type, &arg.name, true, nullptr, reflected)) {
-    Fail("Type expected when read " + Printed(current));
-  }
+  std::optional<ParsedType> parsed = ParseTypeWithName(Naming::Required, rules.reflected);
+  if (!parsed) Fail("Type expected when read " + Printed(current));
+  arg.type = std::move(parsed->type);
+  arg.name = std::move(parsed->name);
   CheckDirection(arg, position);
+  return arg;
 }
 
 std::string QrexParser::ReadArgumentText() {
@@ -295,61 +275,63 @@ std::string QrexParser::ReadArgumentText() {
 }
 
 // From behind the `(` to behind the `)`.
-void QrexParser::ParseArguments(FunctionSignature& signature, bool directionsRequired, bool polymorphicAllowed,
-                                bool reflected) {
+std::vector<FunctionArg> QrexParser::ParseArguments(const SignatureRules& rules) {
+  std::vector<FunctionArg> arguments;
   while (!Is(kCloseParen)) {
-    FunctionArg& arg = signature.arguments.emplace_back();
-    if (Is(kOpenBracket) && !directionsRequired) {
-      if (!polymorphicAllowed) Fail("'[' unexpected.  Polymorphic argument not allowed here");
-      arg.polymorphic = true;
-      Advance();
-    }
-    ParseFunctionArg(arg, directionsRequired, reflected);
-    if (arg.polymorphic) Expect(kCloseBracket, "]");
+    const bool polymorphic = Is(kOpenBracket) && !rules.directions;
+    if (polymorphic && !rules.polymorphic) Fail("'[' unexpected.  Polymorphic argument not allowed here");
+    if (polymorphic) Advance();
+    FunctionArg& arg = arguments.emplace_back(ParseFunctionArg(rules));
+    arg.polymorphic = polymorphic;
+    if (polymorphic) Expect(kCloseBracket, "]");
     if (Is(kAssign)) arg.defaultValue = ReadArgumentText();
     if (Is(kCloseParen)) break;
     if (!Accept(kComma)) Fail(", or ) expected in argument list when read " + Printed(current));
   }
   Advance();
+  return arguments;
 }
 
-void QrexParser::ParseSignatureEnd(FunctionSignature& signature, bool constAllowed) {
+void QrexParser::ParseSignatureEnd(FunctionSignature& signature, const SignatureRules& rules) {
   if (Is("const")) {
-    if (!constAllowed) Fail("const specifier on global function prohibited");
+    if (!rules.constAllowed) Fail("const specifier on global function prohibited");
     signature.isConst = true;
     Advance();
   }
   if (Accept(kColon)) ParseOptionalMetadata(signature.metadata);
 }
 
-void QrexParser::ParseFunctionSignature(FunctionSignature& signature, bool constAllowed, bool directionsRequired,
-                                        bool polymorphicAllowed, bool reflected) {
+FunctionSignature QrexParser::ParseFunctionSignature(const SignatureRules& rules) {
+  FunctionSignature signature;
   signature.isInline = AcceptWord("inline");
-  if (!ParseTypeWithName(signature.returnType, nullptr, false, nullptr, reflected) || !Is(kIdentifier)) {
-    Fail("Function name expected when read " + Printed(current));
-  }
+  std::optional<ParsedType> returned = ParseTypeWithName(Naming::None, rules.reflected);
+  if (!returned || !Is(kIdentifier)) Fail("Function name expected when read " + Printed(current));
+  signature.returnType = std::move(returned->type);
   signature.name = ReadIdentifier();
   Expect(kOpenParen, "(");
-  ParseArguments(signature, directionsRequired, polymorphicAllowed, reflected);
-  ParseSignatureEnd(signature, constAllowed);
+  signature.arguments = ParseArguments(rules);
+  ParseSignatureEnd(signature, rules);
+  return signature;
 }
 
-void QrexParser::ParseMethodOrAttribute(bool constAllowed, bool& isAttribute, FunctionSignature& signature, bool ipc,
-                                        bool reflected) {
+ParsedMember QrexParser::ParseMethodOrAttribute(const SignatureRules& rules) {
+  ParsedMember member;
+  FunctionSignature& signature = member.signature;
   signature.isInline = AcceptWord("inline");
   const char* const position = current.text.begin;
-  bool followedByParen = false;
-  if (!ParseTypeWithName(signature.returnType, &signature.name, true, &followedByParen, reflected)) {
-    Fail("Type expected when read " + Printed(current));
-  }
-  isAttribute = !followedByParen;
-  if (isAttribute) return;
-  if (ipc && !IsVoid(signature.returnType)) {
+  std::optional<ParsedType> parsed = ParseTypeWithName(Naming::Required, rules.reflected);
+  if (!parsed) Fail("Type expected when read " + Printed(current));
+  signature.returnType = std::move(parsed->type);
+  signature.name = std::move(parsed->name);
+  member.isAttribute = !parsed->followedByParen;
+  if (member.isAttribute) return member;
+  if (rules.directions && !IsVoid(signature.returnType)) {
     FailAt(position, "Return type " + TypeText(signature.returnType) + " invalid - must be void");
   }
   Expect(kOpenParen, "(");
-  ParseArguments(signature, ipc, false, reflected);
-  ParseSignatureEnd(signature, constAllowed);
+  signature.arguments = ParseArguments(rules);
+  ParseSignatureEnd(signature, rules);
+  return member;
 }
 
 // --- Metadata
@@ -374,8 +356,7 @@ void QrexParser::ParseMetadataList(std::string& out) {
   std::string values;
   const size_t count = ParseMetadataValues(values, kCloseBracket, ", or ] expected in meta-data list when read ",
                                            "Maximum list size exceeded");
-  out += static_cast<char>(kOpMetaList + count);
-  out += values;
+  AppendMetadataList(out, count, values);
 }
 
 void QrexParser::ParseOptionalMetadata(std::string& out) {
@@ -392,36 +373,25 @@ void QrexParser::ParseMetadataValue(std::string& out) {
       count = ParseMetadataValues(values, kCloseParen, ", or ) expected in functor arglist when read ",
                                   "Maximum functor arglist size exceeded");
     }
-    out += static_cast<char>(kOpMetaFunctor + count);
-    AppendCompactString(out, name);
-    out += values;
-    return;
+    return AppendMetadataFunctor(out, name, count, values);
   }
   Literal value;
   ParseExpression(value);
   switch (value.kind) {
     case LiteralKind::Bool:
-      out += static_cast<char>(kOpMetaBool);
-      out += value.boolean ? '\1' : '\0';
+      AppendMetadataBool(out, value.boolean);
       break;
     case LiteralKind::Int64:
       if (value.integer < std::numeric_limits<int32_t>::min() || value.integer > std::numeric_limits<int32_t>::max()) {
         Fail("64-bit integer metadata not supported");
       }
-      out += static_cast<char>(kOpMetaInt);
-      AppendInt32(out, static_cast<uint32_t>(value.integer));
+      AppendMetadataInt(out, static_cast<int32_t>(value.integer));
       break;
-    case LiteralKind::Float64: {
-      uint64_t bits;
-      std::memcpy(&bits, &value.real, sizeof bits);
-      out += static_cast<char>(kOpMetaFloat);
-      AppendInt32(out, static_cast<uint32_t>(bits));
-      AppendInt32(out, static_cast<uint32_t>(bits >> 32));
+    case LiteralKind::Float64:
+      AppendMetadataFloat(out, value.real);
       break;
-    }
     case LiteralKind::String:
-      out += static_cast<char>(kOpMetaString);
-      AppendCompactString(out, value.text);
+      AppendMetadataString(out, value.text);
       break;
     default:
       Fail("unsupported literal: " + Printed(current));

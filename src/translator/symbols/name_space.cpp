@@ -87,7 +87,7 @@ const Symbol* SymbolIndex::Find(std::string_view key) const {
 // --- Name spaces
 
 NameSpace::NameSpace(ScannedFile& owner, NameSpace* parent, std::string name)
-    : NameSpaceElement(owner, nullptr, Category::NameSpace),
+    : NameSpaceElement(owner, nullptr, DeclKind::NameSpace),
       m_keyPrefix(parent ? parent->m_keyPrefix + name + "::" : std::string()) {
   this->name = std::move(name);
   this->parent = parent;
@@ -111,7 +111,7 @@ const Symbol* NameSpace::FindSymbol(std::string_view elementName) const {
 NameSpaceElement* NameSpace::LookupLocal(std::string_view elementName) {
   auto found = m_elements.find(elementName);
   if (found != m_elements.end()) return found->second.get();
-  // A name space that an import opened stands here as well. It is made when first asked for.
+  // A name space that an import opened is visible here as well; our part of it is created on first use.
   const Symbol* symbol = FindSymbol(elementName);
   return symbol && symbol->HasNameSpace(owner.mounted) ? FindOrCreateNameSpace(elementName) : nullptr;
 }

@@ -3,7 +3,7 @@
 // A name space's tree is private to its file. Importing a file never copies elements: the imported files become visible
 // ("mounted"), and a name space of the same path in several files is searched as one. Because a file may see thousands
 // of others, nothing is copied per import either: one SymbolIndex per build lists the declarations of each qualified
-// name, and a look-up keeps those whose file stands in the asking file's closure, a bit set. Its cost does not grow
+// name, and a look-up keeps those whose file is in the asking file's import closure, a bit set. Its cost does not grow
 // with the number of files.
 #pragma once
 
@@ -17,14 +17,13 @@
 
 #include "text/index_set.h"
 #include "text/text_writer.h"
+#include "translator/symbols/declaration_kinds.h"
 
 namespace qrex {
 
 class NameSpace;
 class ScannedFile;
 
-enum class Category { Typedef, Interface, Class, NameSpace, Functor, GlobalFunction, GlobalVar, Variant, Enum };
-enum class TraitsKind { Other, Struct, Class, Adt, Model, Interface, Functor, Variant, Enum };
 enum class DeclStatus { Forward, Deferred, Defined };
 
 // The names that a file registers and unregisters, qualified.
@@ -35,20 +34,20 @@ struct RegistrationLists {
 
 class NameSpaceElement {
  public:
-  NameSpaceElement(ScannedFile& owner, const char* position, Category category)
-      : owner(owner), position(position), category(category) {}
+  NameSpaceElement(ScannedFile& owner, const char* position, DeclKind kind)
+      : owner(owner), position(position), kindTraits(TraitsOf(kind)), category(kindTraits.category) {}
   virtual ~NameSpaceElement() = default;
   NameSpaceElement(const NameSpaceElement&) = delete;
   NameSpaceElement& operator=(const NameSpaceElement&) = delete;
 
-  virtual std::string_view GetKeyword() const = 0;            // the word behind `$`
-  virtual std::string_view GetReflectedKindName() const = 0;  // suffix of RegisterReflected
+  std::string_view GetKeyword() const { return kindTraits.keyword; }           // the word behind `$`
+  std::string_view GetReflectedKindName() const { return kindTraits.record; }  // suffix of RegisterReflected
   virtual bool HaveSomethingToRegister() const = 0;
   virtual bool HasRecord() const { return m_reflected; }
   virtual void WriteReflectedDefinition(TextWriter& out) = 0;  // the record
   // The element's text in the reflection tail (emit/records.h).
   virtual void WriteReflection(TextWriter& out, RegistrationLists& lists) = 0;
-  virtual DeclStatus GetDeclStatus() const = 0;
+  DeclStatus GetDeclStatus() const { return status; }
   virtual bool EffectivelyRegistered() const { return m_registered; }
   virtual void CollectReferences(std::vector<const NameSpaceElement*>& out) const = 0;  // appends
   virtual bool ContainsMetaData() const { return !metadata.empty(); }
@@ -64,8 +63,8 @@ class NameSpaceElement {
   std::string name;
   std::string metadata;  // an encoded list, often empty
   NameSpace* parent = nullptr;
-  Category category;
-  TraitsKind traitsKind = TraitsKind::Other;
+  const KindTraits& kindTraits;
+  const Category category;
   DeclStatus status = DeclStatus::Forward;
   bool m_exported = false;
   bool m_reflected = false;
@@ -77,9 +76,9 @@ class NameSpaceElement {
   mutable std::string m_qualifiedName;
 };
 
-// All declarations of one name in a build. What is only forward declared may stand in hundreds of files and
-// never conflicts: it is kept apart, so that a look-up reads the few declarations that say more. The status of an
-// element moves only while its own statement is read, so the newest one is sorted in when the next of its name comes.
+// All declarations of one name in a build. Forward declarations may occur in hundreds of files and never
+// conflict; they are stored separately so that look-ups scan only the few definitions. An element's status changes only
+// while its own statement is parsed, so the newest one is filed when the next of its name is entered.
 class Symbol {
  public:
   void Enter(NameSpaceElement& element);
@@ -116,25 +115,22 @@ class NameSpace : public NameSpaceElement {
  public:
   NameSpace(ScannedFile& owner, NameSpace* parent, std::string name);  // a root has no parent and an empty name
 
-  std::string_view GetKeyword() const override { return "namespace"; }
-  std::string_view GetReflectedKindName() const override { return {}; }
   bool HaveSomethingToRegister() const override;
   void WriteReflectedDefinition(TextWriter&) override {}
   void WriteReflection(TextWriter& out, RegistrationLists& lists) override;  // each element, in map order
-  DeclStatus GetDeclStatus() const override { return DeclStatus::Defined; }
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
   bool ContainsMetaData() const override { return false; }
 
   NameSpaceElement* LookupLocal(std::string_view name);  // own map, with the name spaces that imports bring
   NameSpaceElement* Lookup(std::string_view name);       // with mounted name spaces; throws "Ambiguous identifier : "
   NameSpaceElement* LookupPath(std::string_view path);   // a::b::c
-  bool Sees(std::string_view name) const;                // does anything of that name stand here; never ambiguous
+  bool Sees(std::string_view name) const;                // is anything of that name visible here; never throws
   template <typename T>
   T* LookupKind(std::string_view name, Category kind) {
     NameSpaceElement* element = Lookup(name);
     return element && element->category == kind ? static_cast<T*>(element) : nullptr;
   }
-  NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name stands for something else
+  NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name is that of another kind
   NameSpaceElement& Add(std::unique_ptr<NameSpaceElement> element);  // sets `parent`; replaces what the map had
   bool IsRoot() const { return parent == nullptr; }
   bool Empty() const { return m_elements.empty(); }

@@ -46,7 +46,7 @@ std::string ScannedFile::SourcePath() const { return file.project->SourcePath(fi
 
 namespace {
 
-// Where an import may stand in the tree, in the order of the search.
+// Where an import is searched in the tree, in this order.
 std::array<std::string, 4> ImportCandidates(const ProjectFile& importer, const std::string& path) {
   const size_t slash = importer.path.rfind('/');
   const std::string directory = slash == std::string::npos ? std::string() : importer.path.substr(0, slash);

@@ -52,7 +52,7 @@ struct TypeRegistration {
   const NameSpace* scope = nullptr;  // the name space of the declaration
 };
 
-// Whether the reflection tail of an imported file may stand in this .cpp: it is of the same project, and no other .cpp
+// Whether this .cpp may hold the reflection tail of an imported file: it is of the same project, and no other .cpp
 // has its stem.
 bool MayHoldTail(const ProjectFile& source, const ProjectFile& imported);
 
@@ -75,7 +75,7 @@ class ScannedFile {
   std::vector<std::string> unregisterNames;  // $uninit
   std::vector<TypeRegistration> typeRegistrations;
   std::vector<const char*> lineTable;  // source position of each generated line, null where unknown
-  bool registered = false;             // its tail stands in an output
+  bool registered = false;             // its tail has been written to an output
   ScannedFile* tailHolder = nullptr;   // the .cpp in whose output; null where none is known
   std::vector<ScannedFile*> newTails;  // of a .cpp: those that its translation wrote
   bool lostTail = false;               // of a .cpp: its output holds a tail that has been written into another one
@@ -94,7 +94,7 @@ class ScannedFile {
   const size_t index;           // in the build, for IndexSet
   IndexSet importClosure;       // the files that this one imports, directly or through others
   IndexSet mounted;             // those whose @import was passed: their declarations are visible
-  bool importsIObject = false;  // Vesk/vxObject/IObject.h stands in the import closure
+  bool importsIObject = false;  // Vesk/vxObject/IObject.h is in the import closure
   LSFileFrame frame{host.Settings().context.rootFrame.World()};
   std::unique_ptr<NameSpace> rootNameSpace;
 };

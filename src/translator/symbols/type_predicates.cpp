@@ -4,56 +4,69 @@ namespace qrex {
 
 namespace {
 
-uint8_t Op(std::string_view code) { return code.empty() ? 0 : static_cast<uint8_t>(code.front()); }
-bool IsNamed(uint8_t op) { return op >= kOpClass && op <= kOpGlobalFunction; }
-
 constexpr int kMaxTypedefs = 100;
 
-const TypeBehaviour* BehaviourOf(std::string_view code, NameSpace& root) {
-  return dynamic_cast<const TypeBehaviour*>(NamedElement(code, root));
+const TypeBehaviour* BehaviourOf(TypeView type, NameSpace& root) {
+  return dynamic_cast<const TypeBehaviour*>(NamedElement(type, root));
 }
 
 }  // namespace
 
-NameSpaceElement* NamedElement(std::string_view code, NameSpace& root) { return root.LookupPath(InlineName(code)); }
+NameSpaceElement* NamedElement(TypeView type, NameSpace& root) { return root.LookupPath(type.Name()); }
 
-std::string_view SkipToType(std::string_view code, NameSpace& root) {
+TypeView Resolved(TypeView type, NameSpace& root) {
   for (int i = 0; i < kMaxTypedefs; ++i) {
-    code = SkipMetadata(code);
-    if (Op(code) != kOpTypedef) return code;
-    const auto* target = dynamic_cast<const TypedefTarget*>(NamedElement(code, root));
-    if (!target) return code;
-    code = target->TargetType();
+    type = type.WithoutMetadata();
+    if (type.Op() != kOpTypedef) return type;
+    const auto* target = dynamic_cast<const TypedefTarget*>(NamedElement(type, root));
+    if (!target) return type;
+    type = target->TargetType();
   }
-  return code;
+  return type;
 }
 
-std::string_view SkipDecorators(std::string_view code, NameSpace& root, uint32_t& decorators) {
-  for (;;) {
-    code = SkipToType(code, root);
-    const uint8_t op = Op(code);
-    if (op < kOpVolatile || op > kOpOffsettable) return code;
-    decorators |= 1u << (op - kOpVolatile);
-    code.remove_prefix(1);
+Undecorated WithoutDecorators(TypeView type, NameSpace& root) {
+  Undecorated result;
+  for (result.type = Resolved(type, root); result.type.IsDecorator();
+       result.type = Resolved(result.type.Inner(), root)) {
+    result.decorators |= 1u << (result.type.Op() - kOpVolatile);
   }
+  return result;
 }
 
-bool IsSerialisable(std::string_view code, NameSpace& root) {
-  for (;;) {
-    code = SkipToType(code, root);
-    const uint8_t op = Op(code);
-    if (op >= kOpBool && op <= kOpString16) return true;
-    switch (op) {
-      case kOpEnum:
+namespace {
+
+bool IsDeclaredSerialisable(TypeView type, NameSpace& root) {
+  switch (CategoryOf(type.Op())) {
+    case Category::Enum:
+      return true;
+    case Category::Class:
+    case Category::Variant: {
+      const TypeBehaviour* behaviour = BehaviourOf(type, root);
+      return behaviour && behaviour->CanSerialise();
+    }
+    case Category::Typedef:  // one that leads nowhere
+    case Category::Interface:
+    case Category::Functor:
+    case Category::GlobalFunction:
+    case Category::GlobalVar:
+    case Category::NameSpace:
+      return false;
+  }
+  return false;
+}
+
+}  // namespace
+
+bool IsSerialisable(TypeView type, NameSpace& root) {
+  for (;; type = type.Inner()) {
+    type = Resolved(type, root);
+    if (type.IsNamed()) return IsDeclaredSerialisable(type, root);
+    switch (type.Op()) {
       case kOpOpenVariant:
       case kOpPref:
       case kOpCref:
         return true;
-      case kOpClass:
-      case kOpVariant: {
-        const TypeBehaviour* behaviour = BehaviourOf(code, root);
-        return behaviour && behaviour->CanSerialise();
-      }
       case kOpAssignable:
       case kOpMovable:
       case kOpOffsettable:
@@ -63,73 +76,52 @@ bool IsSerialisable(std::string_view code, NameSpace& root) {
       case kOpSet:
       case kOpBag:
       case kOpDynArray:
-        code.remove_prefix(1);
-        break;
       case kOpArray:
-        code = ArrayElement(code);
         break;
       case kOpMap:
-        if (!IsSerialisable(MapKey(code), root)) return false;
-        code = MapValue(code);
+        if (!IsSerialisable(type.Key(), root)) return false;
         break;
       default:
-        return false;
+        return type.IsBuiltIn() && type.Op() != kOpVoid;
     }
   }
 }
 
 namespace {
 
-bool NeedsVisit(std::string_view code, NameSpace& root, std::string_view always,
-                bool (TypeBehaviour::*isVisitable)() const) {
-  for (;;) {
-    code = SkipToType(code, root);
-    const uint8_t op = Op(code);
+bool NeedsVisit(TypeView type, NameSpace& root, std::string_view always, bool (TypeBehaviour::*isVisitable)() const) {
+  for (;; type = type.Inner()) {
+    type = Resolved(type, root);
+    const TypeOp op = type.Op();
     if (always.find(static_cast<char>(op)) != std::string_view::npos) return true;
     if (op == kOpClass || op == kOpVariant) {
-      const TypeBehaviour* behaviour = BehaviourOf(code, root);
+      const TypeBehaviour* behaviour = BehaviourOf(type, root);
       return behaviour && (behaviour->*isVisitable)();
     }
-    const bool looksInside = (op >= kOpVolatile && op <= kOpOffsettable) || op == kOpReference || op == kOpVector ||
-                             op == kOpDeque || op == kOpList || op == kOpBag || op == kOpDynArray;
-    if (op == kOpArray) {
-      code = ArrayElement(code);
-    } else if (looksInside) {
-      code.remove_prefix(1);
-    } else {
-      return false;
-    }
+    const bool looksInside = type.IsDecorator() || op == kOpReference || op == kOpVector || op == kOpDeque ||
+                             op == kOpList || op == kOpBag || op == kOpDynArray || op == kOpArray;
+    if (!looksInside) return false;
   }
 }
 
 }  // namespace
 
-bool NeedsVisitObjects(std::string_view code, NameSpace& root) {
+bool NeedsVisitObjects(TypeView type, NameSpace& root) {
   static constexpr char kAlways[] = {kOpPointer, kOpPtr, kOpPref, kOpCref, kOpSet, kOpMap};
-  return NeedsVisit(code, root, {kAlways, sizeof kAlways}, &TypeBehaviour::IsIObjectVisitable);
+  return NeedsVisit(type, root, {kAlways, sizeof kAlways}, &TypeBehaviour::IsIObjectVisitable);
 }
 
-bool NeedsVisitPrefs(std::string_view code, NameSpace& root) {
+bool NeedsVisitPrefs(TypeView type, NameSpace& root) {
   static constexpr char kAlways[] = {kOpPref, kOpCref, kOpSet, kOpMap};
-  return NeedsVisit(code, root, {kAlways, sizeof kAlways}, &TypeBehaviour::IsPrefVisitable);
+  return NeedsVisit(type, root, {kAlways, sizeof kAlways}, &TypeBehaviour::IsPrefVisitable);
 }
 
-void CollectNamedTypes(std::string_view code, NameSpace& root, std::vector<const NameSpaceElement*>& out) {
-  for (;;) {
-    code = SkipMetadata(code);
-    const uint8_t op = Op(code);
-    if (IsNamed(op)) {
-      if (const NameSpaceElement* element = NamedElement(code, root)) out.push_back(element);
-      return;
-    }
-    if (op < kOpVolatile) return;
-    if (op == kOpMap) {
-      CollectNamedTypes(MapKey(code), root, out);
-      code = MapValue(code);
-    } else {
-      code.remove_prefix(op == kOpArray ? 5 : 1);
-    }
+void CollectNamedTypes(TypeView type, NameSpace& root, std::vector<const NameSpaceElement*>& out) {
+  for (type = type.WithoutMetadata(); type.HasInner(); type = type.Inner().WithoutMetadata()) {
+    if (type.Op() == kOpMap) CollectNamedTypes(type.Key(), root, out);
   }
+  if (!type.IsNamed() || type.Op() == kOpCppText) return;
+  if (const NameSpaceElement* element = NamedElement(type, root)) out.push_back(element);
 }
 
 void CollectNamedTypes(const FunctionSignature& signature, NameSpace& root, std::vector<const NameSpaceElement*>& out) {
@@ -137,10 +129,33 @@ void CollectNamedTypes(const FunctionSignature& signature, NameSpace& root, std:
   for (const FunctionArg& argument : signature.arguments) CollectNamedTypes(argument.type, root, out);
 }
 
-int64_t SizeInBytes(std::string_view code, NameSpace& root) {
-  uint32_t decorators = 0;
-  code = SkipDecorators(code, root, decorators);
-  switch (Op(code)) {
+namespace {
+
+int64_t DeclaredSize(Category category) {
+  switch (category) {
+    case Category::Enum:
+      return 4;
+    case Category::GlobalFunction:
+      return 8;
+    case Category::Functor:
+      return 16;
+    case Category::Typedef:
+    case Category::Interface:
+    case Category::Class:
+    case Category::Variant:
+    case Category::GlobalVar:
+    case Category::NameSpace:
+      return -1;
+  }
+  return -1;
+}
+
+}  // namespace
+
+int64_t SizeInBytes(TypeView decorated, NameSpace& root) {
+  const TypeView type = WithoutDecorators(decorated, root).type;
+  if (type.IsNamed()) return DeclaredSize(CategoryOf(type.Op()));
+  switch (type.Op()) {
     case kOpBool:
     case kOpInt8:
     case kOpUInt8:
@@ -153,17 +168,14 @@ int64_t SizeInBytes(std::string_view code, NameSpace& root) {
     case kOpInt32:
     case kOpUInt32:
     case kOpFloat32:
-    case kOpEnum:
       return 4;
     case kOpInt64:
     case kOpUInt64:
     case kOpFloat64:
-    case kOpGlobalFunction:
     case kOpPointer:
       return 8;
     case kOpInt128:
     case kOpUInt128:
-    case kOpFunctor:
     case kOpPtr:
     case kOpOpenVariant:
       return 16;
@@ -177,8 +189,8 @@ int64_t SizeInBytes(std::string_view code, NameSpace& root) {
     case kOpMap:
       return 24;
     case kOpArray: {
-      const int64_t element = SizeInBytes(ArrayElement(code), root);
-      return element < 0 ? -1 : element * ArraySize(code);
+      const int64_t element = SizeInBytes(type.Inner(), root);
+      return element < 0 ? -1 : element * type.Count();
     }
     default:
       return -1;
@@ -186,21 +198,13 @@ int64_t SizeInBytes(std::string_view code, NameSpace& root) {
 }
 
 // Names of classes and sizes of arrays are not compared.
-bool SameType(std::string_view a, NameSpace& rootA, std::string_view b, NameSpace& rootB) {
-  for (;;) {
-    a = SkipToType(a, rootA);
-    b = SkipToType(b, rootB);
-    const uint8_t op = Op(a);
-    if (op != Op(b)) return false;
-    if (op < 40) return true;
-    if (op == kOpMap) {
-      if (!SameType(MapKey(a), rootA, MapKey(b), rootB)) return false;
-      a = MapValue(a);
-      b = MapValue(b);
-    } else {
-      a.remove_prefix(op == kOpArray ? 5 : 1);
-      b.remove_prefix(op == kOpArray ? 5 : 1);
-    }
+bool SameType(TypeView a, NameSpace& rootA, TypeView b, NameSpace& rootB) {
+  for (;; a = a.Inner(), b = b.Inner()) {
+    a = Resolved(a, rootA);
+    b = Resolved(b, rootB);
+    if (a.Op() != b.Op()) return false;
+    if (!a.HasInner()) return true;
+    if (a.Op() == kOpMap && !SameType(a.Key(), rootA, b.Key(), rootB)) return false;
   }
 }
 
@@ -209,7 +213,7 @@ bool SameType(std::string_view a, NameSpace& rootA, std::string_view b, NameSpac
 namespace {
 
 // The first rule on decorators that the level breaks; empty when none. May clear `isMutable`.
-std::string_view CheckDecorators(uint32_t decorators, uint8_t op, const TypeContext& context, bool& isMutable) {
+std::string_view CheckDecorators(uint32_t decorators, TypeOp op, const TypeContext& context, bool& isMutable) {
   const bool insidePointer = context.enclosing == kOpPointer || context.enclosing == kOpPtr ||
                              context.enclosing == kOpPref || context.enclosing == kOpCref;
   if (decorators & (kHasConst | kHasVolatile)) {
@@ -237,27 +241,41 @@ std::string_view CheckDecorators(uint32_t decorators, uint8_t op, const TypeCont
   return {};
 }
 
-std::string_view CheckEnclosing(uint8_t op, uint8_t enclosing) {
+std::string_view CheckEnclosing(TypeOp op, TypeOp enclosing) {
   if (enclosing == kOpPref && op != kOpInterface) return "pref<T> requires that T be an interface";
   if (enclosing == kOpPtr && op != kOpInterface) return "ptr<T> requires that T be an interface";
   if (enclosing == kOpCref && op != kOpClass) return "cref<T> requires that T be a class/struct/model";
   return {};
 }
 
+std::string_view CheckDeclared(Category category, const TypeContext& context) {
+  switch (category) {
+    case Category::Interface:
+      return context.enclosing == kOpPtr || context.enclosing == kOpPref
+                 ? ""
+                 : "Interface specfifer must appear in pref<> or ptr<>";
+    case Category::Functor:
+      if (context.inModel) return "functor not permitted within models";
+      return context.serialisable ? "functor doesn't support serialisation" : "";
+    case Category::GlobalFunction:
+      return context.serialisable ? "Pointers don't support serialisation" : "";
+    case Category::Typedef:
+    case Category::Class:
+    case Category::Variant:
+    case Category::Enum:
+    case Category::GlobalVar:
+    case Category::NameSpace:
+      return {};
+  }
+  return {};
+}
+
 // A fault of the opcode itself in its context; empty when there is none.
-std::string_view CheckOpcode(uint8_t op, const TypeContext& context) {
+std::string_view CheckOpcode(TypeOp op, const TypeContext& context) {
   switch (op) {
     case kOpVoid:
       if (!context.allowVoid) return "void not permitted here";
       return context.serialisable ? "void type doesn't support serialisation" : "";
-    case kOpInterface:
-      return context.enclosing == kOpPtr || context.enclosing == kOpPref
-                 ? ""
-                 : "Interface specfifer must appear in pref<> or ptr<>";
-    case kOpFunctor:
-      if (context.inModel) return "functor not permitted within models";
-      return context.serialisable ? "functor doesn't support serialisation" : "";
-    case kOpGlobalFunction:
     case kOpPointer:
       return context.serialisable ? "Pointers don't support serialisation" : "";
     case kOpReference:
@@ -278,30 +296,25 @@ std::string_view CheckOpcode(uint8_t op, const TypeContext& context) {
 
 }  // namespace
 
-bool CheckType(std::string_view code, NameSpace& root, TypeContext context, std::string& message) {
-  for (;;) {
-    uint32_t decorators = 0;
-    code = SkipDecorators(code, root, decorators);
-    const uint8_t op = Op(code);
-    for (std::string_view fault : {CheckDecorators(decorators, op, context, context.isMutable),
-                                   CheckEnclosing(op, context.enclosing), CheckOpcode(op, context)}) {
-      if (fault.empty()) continue;
-      message = fault;
-      return false;
+std::string_view TypeFault(TypeView type, NameSpace& root, TypeContext context) {
+  for (;; type = type.Inner()) {
+    const Undecorated undecorated = WithoutDecorators(type, root);
+    type = undecorated.type;
+    const TypeOp op = type.Op();
+    for (std::string_view fault :
+         {CheckDecorators(undecorated.decorators, op, context, context.isMutable),
+          CheckEnclosing(op, context.enclosing),
+          type.IsNamed() ? CheckDeclared(CategoryOf(op), context) : CheckOpcode(op, context)}) {
+      if (!fault.empty()) return fault;
     }
-    if (op < kOpVolatile) return true;
-    if (op == kOpOpenVariant) return true;
+    if (!type.HasInner() || op == kOpOpenVariant) return {};
     if (op == kOpVector) context.isMutable = false;
     context.enclosing = op;
     context.allowVoid = op == kOpPointer;
-    if (op == kOpMap) {
-      TypeContext keyContext = context;
-      keyContext.isMutable = false;
-      if (!CheckType(MapKey(code), root, keyContext, message)) return false;
-      code = MapValue(code);
-    } else {
-      code.remove_prefix(op == kOpArray ? 5 : 1);
-    }
+    if (op != kOpMap) continue;
+    TypeContext keyContext = context;
+    keyContext.isMutable = false;
+    if (std::string_view fault = TypeFault(type.Key(), root, keyContext); !fault.empty()) return fault;
   }
 }
 

@@ -2,16 +2,15 @@
 #pragma once
 
 #include <cstdint>
-#include <string>
 #include <string_view>
 #include <vector>
 
 #include "translator/symbols/name_space.h"
-#include "translator/types/type_code.h"
+#include "translator/types/type_view.h"
 
 namespace qrex {
 
-// --- Predicates. `root` is the root name space of the file of the element that holds the type.
+// `root`, throughout: the root name space of the file of the element that holds the type.
 enum DecoratorBits : uint32_t {
   kHasVolatile = 1,
   kHasConst = 2,
@@ -19,35 +18,44 @@ enum DecoratorBits : uint32_t {
   kHasMovable = 8,
   kHasOffsettable = 16
 };
-// Skips metadata and replaces typedefs by their target at the head; the result may refer to the typedef's own code.
-std::string_view SkipToType(std::string_view code, NameSpace& root);
-std::string_view SkipDecorators(std::string_view code, NameSpace& root, uint32_t& decorators);
-NameSpaceElement* NamedElement(std::string_view code, NameSpace& root);  // of an opcode 32..38 at the head; or null
-bool IsSerialisable(std::string_view code, NameSpace& root);
-bool NeedsVisitObjects(std::string_view code, NameSpace& root);
-bool NeedsVisitPrefs(std::string_view code, NameSpace& root);
-void CollectNamedTypes(std::string_view code, NameSpace& root, std::vector<const NameSpaceElement*>& out);
+
+// A type behind its metadata, typedefs and decorators, and which decorators these were.
+struct Undecorated {
+  TypeView type;
+  uint32_t decorators = 0;
+  bool Has(DecoratorBits bit) const { return (decorators & bit) != 0; }
+};
+Undecorated WithoutDecorators(TypeView type, NameSpace& root);
+// Behind metadata and typedefs alone; a view of the typedef's own code where there was one.
+TypeView Resolved(TypeView type, NameSpace& root);
+NameSpaceElement* NamedElement(TypeView type, NameSpace& root);  // of a named type; null: it isn't declared
+
+bool IsSerialisable(TypeView type, NameSpace& root);
+bool NeedsVisitObjects(TypeView type, NameSpace& root);
+bool NeedsVisitPrefs(TypeView type, NameSpace& root);
+void CollectNamedTypes(TypeView type, NameSpace& root, std::vector<const NameSpaceElement*>& out);  // appends
 void CollectNamedTypes(const FunctionSignature& signature, NameSpace& root, std::vector<const NameSpaceElement*>& out);
-int64_t SizeInBytes(std::string_view code, NameSpace& root);  // -1 unknown
-bool SameType(std::string_view a, NameSpace& rootA, std::string_view b, NameSpace& rootB);
+int64_t SizeInBytes(TypeView type, NameSpace& root);  // -1 unknown
+bool SameType(TypeView a, NameSpace& rootA, TypeView b, NameSpace& rootB);
 
 struct TypeContext {
-  uint8_t enclosing = 0;
+  TypeOp enclosing = kOpVoid;
   bool isMutable = false;
   bool inModel = false;
   bool serialisable = false;
   bool allowVoid = false;
 };
-bool CheckType(std::string_view code, NameSpace& root, TypeContext context, std::string& message);
+// The first rule for fields that the type breaks ("void not permitted here"); empty when it keeps all.
+std::string_view TypeFault(TypeView type, NameSpace& root, TypeContext context);
 
-// What stands behind a typedef: TypedefDef derives from this as well.
+// The target of a typedef; implemented by TypedefDef.
 class TypedefTarget {
  public:
   virtual ~TypedefTarget() = default;
   virtual const TypeCode& TargetType() const = 0;
 };
 
-// What IsSerialisable and the visit predicates ask of a class or variant: both derive from this as well.
+// What IsSerialisable and the visit predicates ask of a class or variant; implemented by both.
 class TypeBehaviour {
  public:
   virtual ~TypeBehaviour() = default;

@@ -1,6 +1,7 @@
 #include "translator/types/type_code.h"
 
 #include <algorithm>
+#include <cstring>
 
 #include "text/numbers.h"
 
@@ -8,34 +9,79 @@ namespace qrex {
 
 namespace {
 
-uint8_t Op(std::string_view code) { return code.empty() ? 0 : static_cast<uint8_t>(code.front()); }
-bool IsNamed(uint8_t op) { return op >= kOpClass && op <= kOpCppText; }
-bool IsTemplate(uint8_t op) { return op >= kOpPtr && op <= kOpDynArray; }
-bool IsMetadata(uint8_t op) { return op >= 160; }
-
 constexpr std::string_view kBuiltIns[] = {"void",    "bool",    "int8",   "int16",  "int32",   "int64",
                                           "int128",  "uint8",   "uint16", "uint32", "uint64",  "uint128",
                                           "float32", "float64", "char8",  "char16", "string8", "string16"};
 constexpr std::string_view kTemplates[] = {"ptr",    "openvariant", "pref", "cref", "xvector",
                                            "xdeque", "xlist",       "xset", "xbag", "DynArray"};
-constexpr size_t kNameSpaceFree = 2;  // void and bool are C++'s own
 
-std::string_view ShortTemplate(uint8_t op) { return kTemplates[op - kOpPtr]; }
-
-// Of std::vector<std::string>: vector<std::string>.
-std::string_view LastPart(std::string_view name) {
-  int depth = 0;  // of template arguments
-  for (size_t i = name.size(); i-- > 0;) {
-    if (name[i] == '>') ++depth;
-    if (name[i] == '<') --depth;
-    if (name[i] == ':' && depth == 0) return name.substr(i + 1);
-  }
-  return name;
+template <typename Value>
+void AppendLittleEndian(std::string& out, Value value) {
+  for (size_t i = 0; i < sizeof value; ++i) out += static_cast<char>(value >> (8 * i));
 }
 
-// Behind the metadata value at the head.
+void AppendByte(std::string& out, size_t byte) { out += static_cast<char>(byte); }
+
+// Of a value that is neither a string, a list nor a functor.
+size_t PlainValueBytes(uint8_t op) { return op == kOpMetaBool ? 1 : op == kOpMetaInt ? 4 : 8; }
+
+}  // namespace
+
+std::string_view BuiltInTypeName(TypeOp op) { return kBuiltIns[op]; }
+std::string_view TemplateTypeName(TypeOp op) { return kTemplates[op - kOpPtr]; }
+
+// --- Building
+
+void AppendOp(TypeCode& code, TypeOp op) { AppendByte(code, op); }
+void PrependOp(TypeCode& code, TypeOp op) { code.insert(0, 1, static_cast<char>(op)); }
+
+void AppendArray(TypeCode& code, uint32_t count) {
+  AppendOp(code, kOpArray);
+  AppendLittleEndian(code, count);
+}
+
+void AppendNamedType(TypeCode& code, TypeOp op, std::string_view name) {
+  AppendOp(code, op);
+  AppendCompactString(code, name);
+}
+
+// --- Metadata
+
+void AppendMetadataBool(std::string& out, bool value) {
+  AppendOp(out, kOpMetaBool);
+  AppendByte(out, value);
+}
+
+void AppendMetadataInt(std::string& out, int32_t value) {
+  AppendOp(out, kOpMetaInt);
+  AppendLittleEndian(out, static_cast<uint32_t>(value));
+}
+
+void AppendMetadataFloat(std::string& out, double value) {
+  uint64_t bits;
+  std::memcpy(&bits, &value, sizeof bits);
+  AppendOp(out, kOpMetaFloat);
+  AppendLittleEndian(out, bits);
+}
+
+void AppendMetadataString(std::string& out, std::string_view value) {
+  AppendOp(out, kOpMetaString);
+  AppendCompactString(out, value);
+}
+
+void AppendMetadataList(std::string& out, size_t count, std::string_view values) {
+  AppendByte(out, kOpMetaList + count);
+  out += values;
+}
+
+void AppendMetadataFunctor(std::string& out, std::string_view name, size_t count, std::string_view values) {
+  AppendByte(out, kOpMetaFunctor + count);
+  AppendCompactString(out, name);
+  out += values;
+}
+
 std::string_view SkipMetadataValue(std::string_view code) {
-  const uint8_t op = Op(code);
+  const uint8_t op = static_cast<uint8_t>(code.front());
   code.remove_prefix(1);
   size_t values = 0;
   std::string_view text;
@@ -47,189 +93,94 @@ std::string_view SkipMetadataValue(std::string_view code) {
   } else if (op == kOpMetaString) {
     ReadCompactString(code, text);
   } else {
-    code.remove_prefix(op == kOpMetaBool ? 1 : op == kOpMetaInt ? 4 : 8);
+    code.remove_prefix(PlainValueBytes(op));
   }
   for (; values > 0; --values) code = SkipMetadataValue(code);
   return code;
 }
 
-}  // namespace
-
-std::string_view BuiltInTypeName(uint8_t op) { return kBuiltIns[op]; }
-std::string_view TemplateTypeName(uint8_t op) { return ShortTemplate(op); }
-
-void AppendNamedType(TypeCode& code, uint8_t op, std::string_view name) {
-  code += static_cast<char>(op);
-  AppendCompactString(code, name);
-}
-
-std::string_view SkipMetadata(std::string_view code) {
-  while (!code.empty() && IsMetadata(Op(code))) code = SkipMetadataValue(code);
-  return code;
-}
-
-std::string_view InlineName(std::string_view code) {
-  code.remove_prefix(1);
-  std::string_view name;
-  ReadCompactString(code, name);
-  return name;
-}
-
-std::string_view SkipWholeType(std::string_view code) {
-  for (;;) {
-    code = SkipMetadata(code);
-    const uint8_t op = Op(code);
-    if (IsNamed(op))
-      return code.substr(static_cast<size_t>(InlineName(code).data() + InlineName(code).size() - code.data()));
-    if (op < kOpClass) return code.substr(code.empty() ? 0 : 1);
-    if (op == kOpMap) {
-      code = MapValue(code);
-    } else {
-      code.remove_prefix(op == kOpArray ? 5 : 1);
-    }
-  }
-}
-
-uint32_t ArraySize(std::string_view code) {
-  uint32_t size = 0;
-  for (size_t i = 4; i > 0; --i) size = size << 8 | static_cast<unsigned char>(code[i]);
-  return size;
-}
-
-std::string_view ArrayElement(std::string_view code) { return code.substr(5); }
-std::string_view MapKey(std::string_view code) {
-  return code.substr(1, SkipWholeType(code.substr(1)).data() - code.data() - 1);
-}
-std::string_view MapValue(std::string_view code) { return SkipWholeType(code.substr(1)); }
-
-// --- Metadata and void
-
-bool HasMetadata(std::string_view code) {
-  for (;;) {
-    const uint8_t op = Op(code);
-    if (op >= 160) return true;
-    if (op < 40) return false;
-    if (op == kOpMap) {
-      if (HasMetadata(MapKey(code))) return true;
-      code = MapValue(code);
-    } else {
-      code.remove_prefix(op == kOpArray ? 5 : 1);
-    }
-  }
-}
-
-bool IsVoid(std::string_view code) { return Op(SkipMetadata(code)) == kOpVoid; }
-
-bool SignatureHasMetadata(const FunctionSignature& signature) {
-  return !signature.metadata.empty() || HasMetadata(signature.returnType) ||
-         std::any_of(signature.arguments.begin(), signature.arguments.end(),
-                     [](const FunctionArg& argument) { return HasMetadata(argument.type); });
-}
-
-// --- Printing
-
-void PrintType(TextWriter& out, std::string_view code) {
-  code = SkipMetadata(code);
-  const uint8_t op = Op(code);
-  if (op <= kOpString16) {
-    out << (op < kNameSpaceFree ? "" : "vesk::") << kBuiltIns[op];
-  } else if (IsNamed(op)) {
-    out << InlineName(code);
-  } else if (op == kOpArray) {
-    out << "vesk::Array<";
-    PrintType(out, ArrayElement(code));
-    out << "," << ArraySize(code) << ">";
-  } else if (op == kOpMap) {
-    out << "vesk::xmap<";
-    PrintType(out, MapKey(code));
-    out << ",";
-    PrintType(out, MapValue(code));
-    out << " >";
-  } else if (IsTemplate(op)) {
-    const std::string_view inner = code.substr(1);
-    out << "vesk::" << ShortTemplate(op) << "<";
-    PrintType(out, inner);
-    out << (IsTemplate(Op(SkipMetadata(inner))) ? " >" : ">");
-  } else {
-    PrintType(out, code.substr(1));
-    switch (op) {
-      case kOpVolatile:
-        out << " volatile";
-        break;
-      case kOpConst:
-        out << " const";
-        break;
-      case kOpPointer:
-        out << "*";
-        break;
-      case kOpReference:
-        out << "&";
-        break;
-      default:
-        break;  // the other decorators have no text in C++
-    }
-  }
-}
-
-std::string TypeText(std::string_view code) {
-  MemoryTextWriter text;
-  PrintType(text, code);
-  return text.TakeText();
-}
-
-void PrintDeclaration(TextWriter& out, std::string_view code, std::string_view name, DeclarationMode mode) {
-  PrintType(out, code);
-  if (mode == DeclarationMode::Reference) out << "&";
-  if (mode == DeclarationMode::ConstReference) out << " const&";
-  if (!name.empty()) out << " " << name;
-}
-
-std::string ConstReferenceText(std::string_view code, std::string_view name) {
-  MemoryTextWriter text;
-  PrintDeclaration(text, code, name, DeclarationMode::ConstReference);
-  return text.TakeText();
-}
-
-std::string MangledType(std::string_view code) {
-  code = SkipMetadata(code);
-  const uint8_t op = Op(code);
-  if (op <= kOpString16) return std::string(kBuiltIns[op]);
-  if (IsNamed(op)) {
-    std::string name(InlineName(code));
-    ReplaceAllInPlace(name, "::", "_");
-    return name;
-  }
-  if (op == kOpArray) return "array" + std::to_string(ArraySize(code)) + "_" + MangledType(ArrayElement(code));
-  if (op == kOpMap) return "map_" + MangledType(MapKey(code)) + "_" + MangledType(MapValue(code));
-  const std::string inner = MangledType(code.substr(1));
-  if (op == kOpPointer) return "ptr_" + inner;
-  if (op == kOpReference) return "ref_" + inner;
-  return IsTemplate(op) ? std::string(ShortTemplate(op)) + "_" + inner : inner;
-}
+// --- Byte code
 
 namespace {
 
-// The name under which a destructor stands, without the `~`.
-std::string DestructorStem(std::string_view code) {
-  const uint8_t op = Op(code);
-  if (op == kOpArray) return "Array";
-  if (op == kOpMap) return "xmap";
-  if (op == kOpString8 || op == kOpString16) return std::string(kBuiltIns[op]);
-  if (IsTemplate(op)) return std::string(ShortTemplate(op));
-  if (!IsNamed(op)) return {};
-  return std::string(LastPart(InlineName(code)));
-}
+// Rewrites a code: each inline string becomes its index.
+class Indexer {
+ public:
+  Indexer(std::string_view code, const IndexOfString& indexOf) : m_rest(code), m_indexOf(indexOf) {}
+
+  void TranslateType() {
+    for (;;) {
+      const uint8_t op = Take();
+      if (op >= kOpMetaBool) {
+        TranslateMetadataOf(op);
+      } else if (op < kOpClass) {
+        return;
+      } else if (op < kOpVolatile) {
+        return TakeString();
+      } else if (op == kOpArray) {
+        TakeBytes(4);
+      } else if (op == kOpMap) {
+        TranslateType();
+      }
+    }
+  }
+
+  void TranslateMetadata() { TranslateMetadataOf(Take()); }
+  const std::string& Bytes() const { return m_bytes; }
+
+ private:
+  uint8_t Take() {
+    if (m_rest.empty()) return 0;
+    const char op = m_rest.front();
+    TakeBytes(1);
+    return static_cast<uint8_t>(op);
+  }
+
+  void TakeBytes(size_t count) {
+    m_bytes.append(m_rest.substr(0, count));
+    m_rest.remove_prefix(std::min(count, m_rest.size()));
+  }
+
+  void TakeString() {
+    std::string_view text;
+    ReadCompactString(m_rest, text);
+    const uint16_t index = m_indexOf(text);
+    m_bytes += static_cast<char>(index & 0xFF);
+    m_bytes += static_cast<char>(index >> 8);
+  }
+
+  void TranslateMetadataOf(uint8_t op) {
+    size_t values = 0;
+    if (op >= kOpMetaList) {
+      values = op - kOpMetaList;
+    } else if (op >= kOpMetaFunctor) {
+      values = op - kOpMetaFunctor;
+      TakeString();
+    } else if (op == kOpMetaString) {
+      TakeString();
+    } else {
+      TakeBytes(PlainValueBytes(op));
+    }
+    for (; values > 0; --values) TranslateMetadata();
+  }
+
+  std::string_view m_rest;
+  const IndexOfString& m_indexOf;
+  std::string m_bytes;
+};
 
 }  // namespace
 
-std::string QualifiedDestructorText(std::string_view code) {
-  code = SkipMetadata(code);
-  const std::string stem = DestructorStem(code);
-  if (stem.empty()) return {};
-  const uint8_t op = Op(code);
-  if (op == kOpString8 || op == kOpString16) return TypeText(code) + "::~basic_xstring";
-  if (IsTemplate(op)) return "vesk::" + stem + "<" + TypeText(code.substr(1)) + ">::~" + stem;
-  return TypeText(code) + "::~" + (IsNamed(op) && stem == "xstring" ? "basic_xstring" : stem);
+std::string IndexedType(std::string_view code, const IndexOfString& indexOf) {
+  Indexer indexer(code, indexOf);
+  indexer.TranslateType();
+  return indexer.Bytes();
+}
+
+std::string IndexedMetadata(std::string_view metadata, const IndexOfString& indexOf) {
+  Indexer indexer(metadata, indexOf);
+  indexer.TranslateMetadata();
+  return indexer.Bytes();
 }
 
 }  // namespace qrex
