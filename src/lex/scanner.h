@@ -13,9 +13,11 @@ namespace qrex {
 // `begin` is the current position. A value: copy it to look ahead, assign the copy back to rewind.
 struct LexScanner : TextRange {
   LexScanner() = default;
-  explicit LexScanner(const TextRange& range) : TextRange(range) {}
-  explicit LexScanner(std::string_view text) : TextRange(text) {}
+  explicit LexScanner(const TextRange& range, Dialect dialect = Dialect::Qrex) : TextRange(range), dialect(dialect) {}
+  explicit LexScanner(std::string_view text, Dialect dialect = Dialect::Qrex) : TextRange(text), dialect(dialect) {}
   bool AtEnd() const { return begin >= end; }
+
+  Dialect dialect = Dialect::Qrex;
 };
 
 inline void SkipWhiteSpace(LexScanner& scanner) {
@@ -25,8 +27,9 @@ inline void SkipWhiteSpace(LexScanner& scanner) {
 }
 
 inline void SkipWord(LexScanner& scanner) {  // what continues an identifier
+  const ByteClasses& classes = ByteClassesOf(scanner.dialect);
   const char* at = scanner.begin;
-  while (at < scanner.end && IsIdentifierPart(*at)) ++at;
+  while (at < scanner.end && IsIdentifierPart(*at, classes)) ++at;
   scanner.begin = at;
 }
 
@@ -38,23 +41,24 @@ int32_t ScanLongToken(LexScanner& scanner);
 inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = false) {
   const char* at = scanner.begin;  // as in the skips above
   const char* const end = scanner.end;
+  const ByteClasses& classes = ByteClassesOf(scanner.dialect);
   do {
-    while (at < end && IsBlankByte(*at)) ++at;
+    while (at < end && ByteClassOf(*at, classes) == kBlankByte) ++at;
     token.text.begin = at;
     if (at >= end) {
       token.kind = kEndOfText;
     } else {
       const char c = *at;
-      const uint8_t byteClass = ByteClassOf(c);
-      if (byteClass == kLetterByte && c != 'r' && c != 'R') {  // these may begin a raw string
+      const uint8_t byteClass = ByteClassOf(c, classes);
+      if (byteClass == kLetterByte) {
         do ++at;
-        while (at < end && IsIdentifierPart(*at));
+        while (at < end && IsIdentifierPart(*at, classes));
         token.kind = kIdentifier;
       } else if (byteClass == kSingleByte) {
         ++at;
         token.kind = SingleToken(c);
       } else {
-        LexScanner rest(TextRange(at, end));
+        LexScanner rest(TextRange(at, end), scanner.dialect);
         token.kind = ScanLongToken(rest);
         at = rest.begin;
       }
@@ -86,7 +90,7 @@ bool SameTokens(LexScanner a, LexScanner b);  // same kinds and texts, comments 
 
 class ParserBase {
  public:
-  void SetInput(const TextRange& text);
+  void SetInput(const TextRange& text, Dialect dialect = Dialect::Qrex);
   void Advance();
   template <typename Stop>
   void AdvanceUntil(Stop stop) {  // at least once, to the next token that `stop` takes
@@ -99,7 +103,7 @@ class ParserBase {
     } while (!stop(token));
     previous = current;
     if (before != current.text.begin) {  // read once more: nothing is kept on the way
-      LexScanner again(TextRange(before, ahead.end));
+      LexScanner again(TextRange(before, ahead.end), ahead.dialect);
       ReadToken(again, previous);
     }
     current = token;

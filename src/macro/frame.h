@@ -10,6 +10,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "lex/byte_class.h"
 #include "lex/token.h"
 #include "text/index_set.h"
 #include "text/text_writer.h"
@@ -163,6 +164,7 @@ class LSFrame {
 class LSFileFrame : public LSFrame {
  public:
   explicit LSFileFrame(LSFrame* parent = nullptr);
+  Dialect dialect = Dialect::Qrex;  // of the file's text, and of the macro bodies in it
   ~LSFileFrame() override;
 
   void AddImport(LSFileFrame& imported);
