@@ -38,12 +38,13 @@ int32_t ScanLongToken(LexScanner& scanner);
 
 // The next token. White space is skipped, comments (kComment) too unless kept; kMacroComment is always returned. At the
 // end of the text: kEndOfText, again and again. Throws LexScannerException.
-inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+template <Dialect dialect>
+inline void ReadTokenOf(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+  constexpr const ByteClasses& classes = kByteClasses[static_cast<size_t>(dialect)];
   const char* at = scanner.begin;  // as in the skips above
   const char* const end = scanner.end;
-  const ByteClasses& classes = ByteClassesOf(scanner.dialect);
   do {
-    while (at < end && ByteClassOf(*at, classes) == kBlankByte) ++at;
+    while (at < end && IsBlankByte(*at)) ++at;
     token.text.begin = at;
     if (at >= end) {
       token.kind = kEndOfText;
@@ -58,7 +59,7 @@ inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = 
         ++at;
         token.kind = SingleToken(c);
       } else {
-        LexScanner rest(TextRange(at, end), scanner.dialect);
+        LexScanner rest(TextRange(at, end), dialect);
         token.kind = ScanLongToken(rest);
         at = rest.begin;
       }
@@ -66,6 +67,15 @@ inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = 
     token.text.end = at;
   } while (token.kind == kComment && !keepComments);
   scanner.begin = at;
+}
+
+// Loops over many tokens ask for the dialect once, and call the above.
+inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+  if (scanner.dialect == Dialect::Cpp) {
+    ReadTokenOf<Dialect::Cpp>(scanner, token, keepComments);
+  } else {
+    ReadTokenOf<Dialect::Qrex>(scanner, token, keepComments);
+  }
 }
 
 inline LexToken NextToken(LexScanner& scanner, bool keepComments = false) {
@@ -94,20 +104,11 @@ class ParserBase {
   void Advance();
   template <typename Stop>
   void AdvanceUntil(Stop stop) {  // at least once, to the next token that `stop` takes
-    LexScanner ahead = scanner;   // copies: they stay in registers
-    LexToken token = current;
-    const char* before;
-    do {
-      before = token.text.begin;
-      ReadToken(ahead, token);
-    } while (!stop(token));
-    previous = current;
-    if (before != current.text.begin) {  // read once more: nothing is kept on the way
-      LexScanner again(TextRange(before, ahead.end), ahead.dialect);
-      ReadToken(again, previous);
+    if (scanner.dialect == Dialect::Cpp) {
+      AdvanceUntilIn<Dialect::Cpp>(stop);
+    } else {
+      AdvanceUntilIn<Dialect::Qrex>(stop);
     }
-    current = token;
-    scanner = ahead;
   }
   void Expect(int32_t kind, std::string_view what);
   [[noreturn]] void FailExpected(std::string_view what) const;  // "Expected what after previous when read current"
@@ -116,6 +117,25 @@ class ParserBase {
   LexToken current;
   LexToken previous;
   LexScanner scanner;
+
+ private:
+  template <Dialect dialect, typename Stop>
+  void AdvanceUntilIn(Stop stop) {
+    LexScanner ahead = scanner;  // copies: they stay in registers
+    LexToken token = current;
+    const char* before;
+    do {
+      before = token.text.begin;
+      ReadTokenOf<dialect>(ahead, token);
+    } while (!stop(token));
+    previous = current;
+    if (before != current.text.begin) {  // read once more: nothing is kept on the way
+      LexScanner again(TextRange(before, ahead.end), dialect);
+      ReadToken(again, previous);
+    }
+    current = token;
+    scanner = ahead;
+  }
 };
 
 }  // namespace qrex

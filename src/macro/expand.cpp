@@ -101,7 +101,8 @@ void ExpansionContext::RunToEnd() {
 }
 
 // To the next token that is not plain; false: there is none.
-bool ExpansionContext::ReadPastPlain(LexToken& found) {
+template <Dialect dialect>
+bool ExpansionContext::ReadPastPlainIn(LexToken& found) {
   LexScanner ahead = m_scanner;  // a copy, and the token too: they stay in registers
   LexToken token;
   do {
@@ -111,7 +112,7 @@ bool ExpansionContext::ReadPastPlain(LexToken& found) {
       SkipToToken();
       ahead = m_scanner;
     }
-    ReadToken(ahead, token, true);
+    ReadTokenOf<dialect>(ahead, token, true);
   } while (IsPlainToken(token));
   m_here = token.text.begin;
   for (const char* at = m_here; at > m_settled; --at) {
@@ -120,6 +121,11 @@ bool ExpansionContext::ReadPastPlain(LexToken& found) {
   m_scanner = ahead;
   found = token;
   return token.kind != kEndOfText;
+}
+
+bool ExpansionContext::ReadPastPlain(LexToken& found) {
+  return m_scanner.dialect == Dialect::Cpp ? ReadPastPlainIn<Dialect::Cpp>(found)
+                                           : ReadPastPlainIn<Dialect::Qrex>(found);
 }
 
 // To the begin of the next token. Every line but the first loses up to `m_stripIndent` columns.

@@ -37,6 +37,8 @@ class ExpansionContext {
   // --- Loop
   void RunToEnd();
   bool ReadPastPlain(LexToken& found);
+  template <Dialect dialect>
+  bool ReadPastPlainIn(LexToken& found);
   void SkipToToken();
   void ExpandIdentifier(const LexToken& token);
   void SubstituteInString(const LexToken& token);
