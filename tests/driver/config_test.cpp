@@ -45,7 +45,8 @@ TEST_F(ConfigTest, Keys) {
       "config = \"Old\" config=\"New\" platform = ('P') systemName = \"N\" systemProcessor = \"R\"\n"
       "systemVersion = \"V\" sizeofPointer = \"8\"\n"
       "compiler = winegcc mode = show\n"
-      "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true modernCpp = true\n"
+      "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true modernCpp = "
+      "true\n"
       "exportPublicHeaders = false repackageExecutableTargets = false solutionContainsPrepackagedProjects = false\n"
       "makeTranslatedFilesReadOnly = false makeExportedHeaderFilesReadOnly = false writeTokenEquivalent = false // the "
       "end",
