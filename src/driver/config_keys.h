@@ -40,6 +40,7 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"makeExportedHeaderFilesReadOnly", &ConfigSettings::makeExportedHeaderFilesReadOnly, "protect exported headers"},
     {"writeTokenEquivalent", &ConfigSettings::writeTokenEquivalent,
      "also write a translation that differs in blanks and comments alone"},
+    {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
 };
 
 inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kListKeys[] = {

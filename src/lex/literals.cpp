@@ -207,6 +207,11 @@ void ReadQuotedText(LexScanner& scanner, std::string& out) {
   }
 }
 
+char ByteOfEscape(char letter) {
+  const Escape* escape = EscapeOfLetter(letter);
+  return escape ? escape->byte : letter;
+}
+
 void WriteEscapedChar(std::string& out, char c) {
   static constexpr char kDigits[] = "0123456789abcdef";
   for (const Escape& escape : kEscapes) {

@@ -21,6 +21,7 @@ double FloatValue(const LexToken& token);
 void DecodeString(const LexToken& token, std::string& out);
 void ReadQuotedText(LexScanner& scanner, std::string& out);  // leaves the scanner on the closing quote
 
+char ByteOfEscape(char letter);  // the letter itself when it stands for nothing
 void WriteEscapedChar(std::string& out, char c);
 void WriteCharLiteral(std::string& out, char c);     // 'c' with escapes
 std::string EscapedString(std::string_view text);    // each byte by WriteEscapedChar, no quotes

@@ -9,6 +9,7 @@
 #include <array>
 #include <cstring>
 
+#include "lex/cpp_literals.h"
 #include "lex/literals.h"
 
 namespace qrex {
@@ -62,6 +63,7 @@ int32_t ScanOperator(LexScanner& scanner) {
   if (forms.doubled != kNoToken && NextIs(scanner, first)) {
     ++scanner.begin;
     if (forms.doubledAssign == forms.doubled || !NextIs(scanner, '=')) return forms.doubled;
+    if (scanner.dialect == Dialect::Cpp && first != '<' && first != '>') return forms.doubled;
     ++scanner.begin;
     if (forms.doubledAssign == kNoToken) {
       throw LexScannerException("Invalid token " + std::string(begin, scanner.begin), scanner.begin);
@@ -78,14 +80,17 @@ int32_t ScanOperator(LexScanner& scanner) {
 // False without moving when no comment starts here.
 bool ScanComment(LexScanner& scanner) {
   if (scanner.end - scanner.begin < 2 || scanner.begin[0] != '/') return false;
-  const size_t rest = static_cast<size_t>(scanner.end - scanner.begin) - 2;
   if (scanner.begin[1] == '/') {
-    const void* lineFeed = std::memchr(scanner.begin + 2, '\n', rest);
-    scanner.begin = lineFeed ? static_cast<const char*>(lineFeed) : scanner.end;
+    const char* at = scanner.begin + 2;
+    do {
+      const void* lineFeed = std::memchr(at, '\n', static_cast<size_t>(scanner.end - at));
+      scanner.begin = lineFeed ? static_cast<const char*>(lineFeed) : scanner.end;
+      at = scanner.begin + 1;
+    } while (scanner.dialect == Dialect::Cpp && !scanner.AtEnd() && scanner.begin[-1] == '\\');
     return true;
   }
   if (scanner.begin[1] != '*') return false;
-  const std::string_view body(scanner.begin + 2, rest);
+  const std::string_view body(scanner.begin + 2, static_cast<size_t>(scanner.end - scanner.begin) - 2);
   const size_t close = body.find("*/");
   if (close == std::string_view::npos) {
     throw LexScannerException("Met EOS in middle of /* ... */ comment", scanner.end);
@@ -97,11 +102,13 @@ bool ScanComment(LexScanner& scanner) {
 }  // namespace
 
 int32_t ScanLongToken(LexScanner& scanner) {
+  const bool isCpp = scanner.dialect == Dialect::Cpp;
   const char c = *scanner.begin;
-  switch (ByteClassOf(c)) {
+  switch (ByteClassOf(c, ByteClassesOf(scanner.dialect))) {
     case kDigitByte:
-      return ReadNumber(scanner);
-    case kLetterByte:
+      return isCpp ? ReadCppNumber(scanner) : ReadNumber(scanner);
+    case kPrefixByte:
+      if (isCpp) return ReadCppWord(scanner);
       if (scanner.end - scanner.begin >= 2) {
         if (scanner.begin[1] == '\'' && ReadQuoted(scanner, '\'', "single quoted string")) return kSingleQuoted;
         if (scanner.begin[1] == '"' && ReadQuoted(scanner, '"', "double quoted string")) return kDoubleQuoted;
@@ -109,6 +116,7 @@ int32_t ScanLongToken(LexScanner& scanner) {
       SkipWord(scanner);
       return kIdentifier;
     case kQuoteByte:
+      if (isCpp) return ReadCppQuoted(scanner);
       if (c == '\'') {
         ReadQuoted(scanner, '\'', "single quoted string");
         return kSingleQuoted;
@@ -126,7 +134,13 @@ int32_t ScanLongToken(LexScanner& scanner) {
         }
       }
       return ScanOperator(scanner);
+    case kDotByte:
+      return ReadCppDot(scanner);
     default:
+      if (isCpp) {
+        ++scanner.begin;
+        return kStray;
+      }
       throw LexScannerException(std::string("Bad token ") + c, scanner.begin);
   }
 }
@@ -172,8 +186,8 @@ bool SameTokens(LexScanner a, LexScanner b) {
   }
 }
 
-void ParserBase::SetInput(const TextRange& text) {
-  scanner = LexScanner(text);
+void ParserBase::SetInput(const TextRange& text, Dialect dialect) {
+  scanner = LexScanner(text, dialect);
   Advance();
 }
 

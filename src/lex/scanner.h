@@ -13,9 +13,11 @@ namespace qrex {
 // `begin` is the current position. A value: copy it to look ahead, assign the copy back to rewind.
 struct LexScanner : TextRange {
   LexScanner() = default;
-  explicit LexScanner(const TextRange& range) : TextRange(range) {}
-  explicit LexScanner(std::string_view text) : TextRange(text) {}
+  explicit LexScanner(const TextRange& range, Dialect dialect = Dialect::Qrex) : TextRange(range), dialect(dialect) {}
+  explicit LexScanner(std::string_view text, Dialect dialect = Dialect::Qrex) : TextRange(text), dialect(dialect) {}
   bool AtEnd() const { return begin >= end; }
+
+  Dialect dialect = Dialect::Qrex;
 };
 
 inline void SkipWhiteSpace(LexScanner& scanner) {
@@ -25,8 +27,9 @@ inline void SkipWhiteSpace(LexScanner& scanner) {
 }
 
 inline void SkipWord(LexScanner& scanner) {  // what continues an identifier
+  const ByteClasses& classes = ByteClassesOf(scanner.dialect);
   const char* at = scanner.begin;
-  while (at < scanner.end && IsIdentifierPart(*at)) ++at;
+  while (at < scanner.end && IsIdentifierPart(*at, classes)) ++at;
   scanner.begin = at;
 }
 
@@ -35,7 +38,9 @@ int32_t ScanLongToken(LexScanner& scanner);
 
 // The next token. White space is skipped, comments (kComment) too unless kept; kMacroComment is always returned. At the
 // end of the text: kEndOfText, again and again. Throws LexScannerException.
-inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+template <Dialect dialect>
+inline void ReadTokenOf(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+  constexpr const ByteClasses& classes = kByteClasses[static_cast<size_t>(dialect)];
   const char* at = scanner.begin;  // as in the skips above
   const char* const end = scanner.end;
   do {
@@ -45,16 +50,16 @@ inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = 
       token.kind = kEndOfText;
     } else {
       const char c = *at;
-      const uint8_t byteClass = ByteClassOf(c);
-      if (byteClass == kLetterByte && c != 'r' && c != 'R') {  // these may begin a raw string
+      const uint8_t byteClass = ByteClassOf(c, classes);
+      if (byteClass == kLetterByte) {
         do ++at;
-        while (at < end && IsIdentifierPart(*at));
+        while (at < end && IsIdentifierPart(*at, classes));
         token.kind = kIdentifier;
       } else if (byteClass == kSingleByte) {
         ++at;
         token.kind = SingleToken(c);
       } else {
-        LexScanner rest(TextRange(at, end));
+        LexScanner rest(TextRange(at, end), dialect);
         token.kind = ScanLongToken(rest);
         at = rest.begin;
       }
@@ -62,6 +67,15 @@ inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = 
     token.text.end = at;
   } while (token.kind == kComment && !keepComments);
   scanner.begin = at;
+}
+
+// Loops over many tokens ask for the dialect once, and call the above.
+inline void ReadToken(LexScanner& scanner, LexToken& token, bool keepComments = false) {
+  if (scanner.dialect == Dialect::Cpp) {
+    ReadTokenOf<Dialect::Cpp>(scanner, token, keepComments);
+  } else {
+    ReadTokenOf<Dialect::Qrex>(scanner, token, keepComments);
+  }
 }
 
 inline LexToken NextToken(LexScanner& scanner, bool keepComments = false) {
@@ -86,24 +100,15 @@ bool SameTokens(LexScanner a, LexScanner b);  // same kinds and texts, comments 
 
 class ParserBase {
  public:
-  void SetInput(const TextRange& text);
+  void SetInput(const TextRange& text, Dialect dialect = Dialect::Qrex);
   void Advance();
   template <typename Stop>
   void AdvanceUntil(Stop stop) {  // at least once, to the next token that `stop` takes
-    LexScanner ahead = scanner;   // copies: they stay in registers
-    LexToken token = current;
-    const char* before;
-    do {
-      before = token.text.begin;
-      ReadToken(ahead, token);
-    } while (!stop(token));
-    previous = current;
-    if (before != current.text.begin) {  // read once more: nothing is kept on the way
-      LexScanner again(TextRange(before, ahead.end));
-      ReadToken(again, previous);
+    if (scanner.dialect == Dialect::Cpp) {
+      AdvanceUntilIn<Dialect::Cpp>(stop);
+    } else {
+      AdvanceUntilIn<Dialect::Qrex>(stop);
     }
-    current = token;
-    scanner = ahead;
   }
   void Expect(int32_t kind, std::string_view what);
   [[noreturn]] void FailExpected(std::string_view what) const;  // "Expected what after previous when read current"
@@ -112,6 +117,25 @@ class ParserBase {
   LexToken current;
   LexToken previous;
   LexScanner scanner;
+
+ private:
+  template <Dialect dialect, typename Stop>
+  void AdvanceUntilIn(Stop stop) {
+    LexScanner ahead = scanner;  // copies: they stay in registers
+    LexToken token = current;
+    const char* before;
+    do {
+      before = token.text.begin;
+      ReadTokenOf<dialect>(ahead, token);
+    } while (!stop(token));
+    previous = current;
+    if (before != current.text.begin) {  // read once more: nothing is kept on the way
+      LexScanner again(TextRange(before, ahead.end), dialect);
+      ReadToken(again, previous);
+    }
+    current = token;
+    scanner = ahead;
+  }
 };
 
 }  // namespace qrex

@@ -31,10 +31,26 @@ LexToken SkipToClose(LexScanner& scanner, int32_t open, int32_t close, const std
   }
 }
 
+// To the end of the last raw string that begins on the line, or on the one where such a string ends.
+void SkipRawStringsOfLine(LexScanner& scanner) {
+  LexScanner ahead = scanner;
+  for (;;) {
+    SkipBlanksInLine(ahead);
+    if (ahead.AtEnd() || *ahead.begin == '\n') return;
+    const LexToken token = NextToken(ahead, true);
+    if (token.kind == kRawString) {
+      scanner = ahead;
+    } else if (token.text.View().find('\n') != std::string_view::npos) {
+      return;
+    }
+  }
+}
+
 // Of the line on which the first token ends: a comment may run over several.
 TextRange RestOfLine(LexScanner& scanner, const char* begin) {
   scanner.begin = begin;
   NextToken(scanner, true);
+  if (scanner.dialect == Dialect::Cpp) SkipRawStringsOfLine(scanner);
   while (!scanner.AtEnd() && *scanner.begin != '\n' && *scanner.begin != '\r') ++scanner.begin;
   return {begin, scanner.begin};
 }

@@ -101,6 +101,9 @@ enum TokenKind : int32_t {
   kBackslash,
   kBackquote,
   kHash,
+  // Of C++ text alone.
+  kRawString,
+  kStray,  // what belongs to no token: a byte, or the rest of a line behind a quote that is not closed there
 };
 
 constexpr int32_t SingleToken(char c) {  // of the characters that are always a token of their own
@@ -136,7 +139,7 @@ constexpr int32_t SingleToken(char c) {  // of the characters that are always a 
 
 struct LexToken {
   int32_t kind = kNoToken;
-  TextRange text;  // exact source text, quotes and raw prefix included
+  TextRange text;  // exact source text, quotes and prefix included
   bool Is(std::string_view word) const { return text == word; }
 };
 

@@ -36,7 +36,7 @@ void ExpansionContext::If() {
   int selectedIndent = 0;
   bool found = false;
   auto readBranch = [&](std::string_view name) {
-    const bool holds = EvaluateCondition(ReadParenSection(m_scanner, false), name);
+    const bool holds = EvaluateCondition(ReadExpressionText(false), name);
     int indent;
     const TextRange block = ReadBraceBlock(m_scanner, indent);
     if (!holds || found) return;
@@ -62,7 +62,7 @@ void ExpansionContext::If() {
 void ExpansionContext::Else() { throw LexScannerException("@else with no matching @if directive", m_tokenText); }
 
 void ExpansionContext::While() {
-  const TextRange condition = ReadParenSection(m_scanner, false);
+  const TextRange condition = ReadExpressionText(false);
   int indent;
   const TextRange block = ReadBlockOf(m_scanner, "@while", indent);
   DropToScanner();
@@ -164,7 +164,7 @@ void ExpansionContext::For() {
 }
 
 void ExpansionContext::RunLoop(const Loop& loop) {
-  LexScanner scanner{std::string_view(loop.elements)};
+  LexScanner scanner(std::string_view(loop.elements), m_scanner.dialect);
   const LexToken open = NextToken(scanner);
   if (open.kind != kOpenBracket) {
     throw LexScannerException(WithToken("[ expected when read read ", open), loop.list);
@@ -211,7 +211,7 @@ void ExpansionContext::BindElement(const Loop& loop, const TextRange& element, L
     frame.AddVariable(std::move(variable));
   };
   if (!loop.isTuple) return bind(loop.variables[0], element);
-  LexScanner scanner(element);
+  LexScanner scanner(element, m_scanner.dialect);
   const LexToken open = NextToken(scanner);
   if (open.kind != kOpenParen) throw LexScannerException(WithToken("( expected when read ", open), loop.list);
   for (size_t i = 0; i < loop.variables.size(); ++i) {

@@ -2,6 +2,7 @@
 
 #include "macro/directives.h"
 
+#include "lex/cpp_literals.h"
 #include "lex/literals.h"
 #include "lex/sections.h"
 #include "macro/directive_expression.h"
@@ -50,7 +51,7 @@ const Directive* Directive::Find(std::string_view word) {
 
 std::string ExpansionContext::ExpandCondition(const TextRange& raw, std::string_view name) {
   try {
-    return ExpandPart(raw);
+    return ExpandExpression(raw);
   } catch (LexScannerException& exception) {
     exception.message += "\n    in " + std::string(name) + "(" + raw.Text() + ")";
     throw;
@@ -68,9 +69,9 @@ std::string ExpansionContext::EvaluateString(const TextRange& raw, std::string_v
 }
 
 void ExpansionContext::ParenExpression() {
-  const TextRange raw = ReadParenSection(m_scanner, true);
+  const TextRange raw = ReadExpressionText(true);
   DropToScanner();
-  const std::string expansion = ExpandPart(raw);
+  const std::string expansion = ExpandExpression(raw);
   EmitGenerated(ReadExpression(
       expansion, "@(", ")", m_tokenText.begin, [](ExpressionParser& parser) { return parser.ReadStringValue(true); },
       "when read "));
@@ -141,7 +142,7 @@ void ExpansionContext::Quote() {
   DropToScanner();
   const LineIndent column = CurrentColumn();
   LexScanner behind = m_scanner;
-  m_scanner = LexScanner(raw);
+  m_scanner = LexScanner(raw, behind.dialect);
   while (!m_scanner.AtEnd()) {
     const size_t lineFeed = m_scanner.View().find('\n');
     const char* end = lineFeed == std::string_view::npos ? m_scanner.end : m_scanner.begin + lineFeed + 1;
@@ -168,7 +169,7 @@ void ExpansionContext::Print(bool endLine) {
 
 void ExpansionContext::Assert() {
   const char* const position = m_scanner.begin;
-  const TextRange raw = ReadParenSection(m_scanner, false);
+  const TextRange raw = ReadExpressionText(false);
   const std::string expansion = ExpandCondition(raw, "@assert");
   const bool holds = ReadExpression(expansion, "@assert(", ")", m_tokenText.begin,
                                     [](ExpressionParser& parser) { return parser.ReadBool(); });
@@ -193,7 +194,7 @@ void ExpansionContext::AssertFails() {
 
 void ExpansionContext::FailDirective() {
   const char* const position = m_scanner.begin;
-  throw LexScannerException(EvaluateString(ReadParenSection(m_scanner, false), "@fail"), position);
+  throw LexScannerException(EvaluateString(ReadExpressionText(false), "@fail"), position);
 }
 
 // --- Imports and paths
@@ -204,9 +205,9 @@ std::string ExpansionContext::ReadStringOrExpression(std::string_view what, bool
   wasExpression = token.kind == kOpenParen;
   std::string text;
   if (token.kind == kDoubleQuoted) {
-    DecodeString(token, text);
+    DecodeString(token, m_scanner.dialect, text);
   } else if (wasExpression) {
-    text = EvaluateString(ReadParenSection(m_scanner, true), "@" + std::string(what));
+    text = EvaluateString(ReadExpressionText(true), "@" + std::string(what));
   } else {
     FailAt(token, "Quoted string expected after '" + std::string(what) + "' when read " + Printed(token));
   }
@@ -269,9 +270,9 @@ void ExpansionContext::DefineSubstitution() {
   const LexToken token = Next();
   std::string value;
   if (token.kind == kDoubleQuoted) {
-    DecodeString(token, value);
+    DecodeString(token, m_scanner.dialect, value);
   } else if (token.kind == kOpenParen) {
-    value = EvaluateString(ReadParenSection(m_scanner, true), "@$");
+    value = EvaluateString(ReadExpressionText(true), "@$");
   } else {
     FailAt(token, "Quoted string expected after $" + name + " definition when read " + Printed(token));
   }

@@ -1,5 +1,7 @@
 #include "macro/expand.h"
 
+#include <cstring>
+
 #include "lex/literals.h"
 #include "lex/sections.h"
 #include "macro/directives.h"
@@ -34,7 +36,7 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
       m_outIndent(outIndent),
       m_text(text),
       m_anchor(anchor),
-      m_scanner(text),
+      m_scanner(text, frame.FileFrame() ? frame.FileFrame()->dialect : Dialect::Qrex),
       m_tokenText(text.begin, text.begin),
       m_pendingBegin(text.begin),
       m_settled(text.begin) {
@@ -77,6 +79,9 @@ void ExpansionContext::RunToEnd() {
       case kDoubleQuoted:
         SubstituteInString(token);
         break;
+      case kRawString:
+        CopyRawString(token);
+        break;
       case kMacroComment:
         m_tokenText = token.text;
         Settle();
@@ -93,7 +98,8 @@ void ExpansionContext::RunToEnd() {
 }
 
 // To the next token that is not plain; false: there is none.
-bool ExpansionContext::ReadPastPlain(LexToken& found) {
+template <Dialect dialect>
+bool ExpansionContext::ReadPastPlainIn(LexToken& found) {
   LexScanner ahead = m_scanner;  // a copy, and the token too: they stay in registers
   LexToken token;
   const NamesInUse& names = m_world.names;
@@ -104,7 +110,7 @@ bool ExpansionContext::ReadPastPlain(LexToken& found) {
       SkipToToken();
       ahead = m_scanner;
     }
-    ReadToken(ahead, token, true);
+    ReadTokenOf<dialect>(ahead, token, true);
   } while (IsPlainToken(token, names));
   m_here = token.text.begin;
   for (const char* at = m_here; at > m_settled; --at) {
@@ -113,6 +119,11 @@ bool ExpansionContext::ReadPastPlain(LexToken& found) {
   m_scanner = ahead;
   found = token;
   return token.kind != kEndOfText;
+}
+
+bool ExpansionContext::ReadPastPlain(LexToken& found) {
+  return m_scanner.dialect == Dialect::Cpp ? ReadPastPlainIn<Dialect::Cpp>(found)
+                                           : ReadPastPlainIn<Dialect::Qrex>(found);
 }
 
 // To the begin of the next token. Every line but the first loses up to `m_stripIndent` columns.
@@ -150,6 +161,16 @@ void ExpansionContext::SubstituteInString(const LexToken& token) {
   }
   FlushTo(m_here);
   EmitGenerated(text);
+  DropToScanner();
+}
+
+// The lines of a raw string are its value, so they are not indented with those around them.
+void ExpansionContext::CopyRawString(const LexToken& token) {
+  if (m_outIndent.IsNone()) return;
+  const void* lineFeed = std::memchr(token.text.begin, '\n', token.text.Size());
+  if (!lineFeed) return;
+  FlushTo(static_cast<const char*>(lineFeed));
+  CopySource({m_pendingBegin, token.text.end}, 0, m_anchor);
   DropToScanner();
 }
 
@@ -271,6 +292,27 @@ std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripInde
   return std::move(sink.output);
 }
 
+static std::string ExpandExpressionAside(LSFrame& frame, const TextRange& text, const TextRange* anchor) {
+  if (text.Empty()) return {};
+  ExpansionSink sink;
+  ExpansionContext context(nullptr, frame, text, 0, 0, sink, anchor);
+  context.ReadAsExpression();
+  context.Run();
+  return std::move(sink.output);
+}
+
+std::string ExpansionContext::ExpandExpression(const TextRange& part) {
+  LSFrame child(&m_frame);
+  return ExpandExpressionAside(child, part, m_anchor);
+}
+
+TextRange ExpansionContext::ReadExpressionText(bool openAlreadyRead) {
+  LexScanner expression(m_scanner, Dialect::Qrex);
+  const TextRange text = ReadParenSection(expression, openAlreadyRead);
+  m_scanner.begin = expression.begin;
+  return text;
+}
+
 LexToken ExpansionContext::RequireIdentifier(std::string_view message) {
   const LexToken token = Next();
   if (token.kind != kIdentifier) FailAt(token, WithToken(message, token));
@@ -346,7 +388,7 @@ std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type) 
 
 std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type, const TextRange* anchor) {
   LSFrame child(&frame);
-  const std::string expansion = ExpandAside(child, text, 0, anchor);
+  const std::string expansion = ExpandExpressionAside(child, text, anchor);
   try {
     ExpressionParser parser;
     parser.SetInput(TextRange(std::string_view(expansion)));

@@ -21,6 +21,8 @@ class ExpansionContext {
   // before a macro that it defines). Null for source text.
   ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
                    LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor);
+  // Expressions of directives are no text of their file: they are read in the one dialect of all expressions.
+  void ReadAsExpression() { m_scanner.dialect = Dialect::Qrex; }
   ~ExpansionContext();
   ExpansionContext(const ExpansionContext&) = delete;
   ExpansionContext& operator=(const ExpansionContext&) = delete;
@@ -35,9 +37,12 @@ class ExpansionContext {
   // --- Loop
   void RunToEnd();
   bool ReadPastPlain(LexToken& found);
+  template <Dialect dialect>
+  bool ReadPastPlainIn(LexToken& found);
   void SkipToToken();
   void ExpandIdentifier(const LexToken& token);
   void SubstituteInString(const LexToken& token);
+  void CopyRawString(const LexToken& token);
   void ExpandAt();
   bool ExpandPredefined(const LexToken& name);
 
@@ -57,6 +62,8 @@ class ExpansionContext {
   // --- Expansion of parts of the text
   void ExpandBlock(const TextRange& block, LSFrame& frame, int indent, LineIndent column);
   std::string ExpandPart(const TextRange& part, int64_t stripIndent = 0);  // in a child frame
+  std::string ExpandExpression(const TextRange& part);                     // the same
+  TextRange ReadExpressionText(bool openAlreadyRead);                      // in parentheses
   // To the sink, as it stands.
   void CopySource(const TextRange& text, LineIndent indent, const TextRange* anchor);
   LexToken Next() { return NextToken(m_scanner); }
@@ -152,6 +159,7 @@ inline bool IsPlainToken(const LexToken& token, const NamesInUse& names) {
       return !names.MayHold(token.text.View());
     case kDoubleQuoted:
       return token.text.View().find("$(") == std::string_view::npos;
+    case kRawString:  // its lines are not indented
     case kMacroComment:
     case kAt:
     case kBackquote:

@@ -2,7 +2,7 @@
 
 #include <cmath>
 
-#include "lex/literals.h"
+#include "lex/cpp_literals.h"
 #include "text/numbers.h"
 
 namespace qrex {
@@ -162,17 +162,18 @@ struct ExpressionGrammar {
     switch (token.kind) {
       case kDecimal:
         parser.Advance();
-        return Literal::OfInt(static_cast<int64_t>(DecimalValue64(token)));
+        return Literal::OfInt(static_cast<int64_t>(IntegerValue(token, parser.scanner.dialect)));
       case kHex:
         parser.Advance();
-        return Literal::OfInt(static_cast<int64_t>(HexValue64(token)));
+        return Literal::OfInt(static_cast<int64_t>(IntegerValue(token, parser.scanner.dialect)));
       case kFloat:
         parser.Advance();
-        return Literal::OfFloat(FloatValue(token));
+        return Literal::OfFloat(FloatValue(token, parser.scanner.dialect));
       case kSingleQuoted:
-      case kDoubleQuoted: {
+      case kDoubleQuoted:
+      case kRawString: {
         std::string text;
-        DecodeString(token, text);
+        DecodeString(token, parser.scanner.dialect, text);
         parser.Advance();
         return Literal::OfString(std::move(text));
       }

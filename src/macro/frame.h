@@ -10,6 +10,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "lex/byte_class.h"
 #include "lex/token.h"
 #include "macro/macro_world.h"
 #include "text/index_set.h"
@@ -137,6 +138,7 @@ class LSFileFrame : public LSFrame {
  public:
   explicit LSFileFrame(MacroWorld& world);
   explicit LSFileFrame(LSFrame* parent);
+  Dialect dialect = Dialect::Qrex;  // of the file's text, and of the macro bodies in it
   ~LSFileFrame() override;
 
   void AddImport(LSFileFrame& imported);

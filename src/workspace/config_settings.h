@@ -42,6 +42,7 @@ struct ConfigSettings {
   bool solutionContainsPrepackagedProjects = true;
   bool makeTranslatedFilesReadOnly = true;
   bool makeExportedHeaderFilesReadOnly = true;
+  bool modernCpp = false;
   RunMode mode = RunMode::Build;
   std::map<std::string, PlatformEnvironment> platformEnvironments;
 

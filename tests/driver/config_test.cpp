@@ -45,7 +45,8 @@ TEST_F(ConfigTest, Keys) {
       "config = \"Old\" config=\"New\" platform = ('P') systemName = \"N\" systemProcessor = \"R\"\n"
       "systemVersion = \"V\" sizeofPointer = \"8\"\n"
       "compiler = winegcc mode = show\n"
-      "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true\n"
+      "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true modernCpp = "
+      "true\n"
       "exportPublicHeaders = false repackageExecutableTargets = false solutionContainsPrepackagedProjects = false\n"
       "makeTranslatedFilesReadOnly = false makeExportedHeaderFilesReadOnly = false writeTokenEquivalent = false // the "
       "end",
@@ -56,7 +57,7 @@ TEST_F(ConfigTest, Keys) {
                                  Got().systemProcessor + " " + Got().systemVersion + " " + Got().sizeofPointer);
   EXPECT_EQ(CompilerKind::winegcc, Got().compiler);
   EXPECT_EQ(RunMode::Clean, Got().mode);  // a line of the command line comes last
-  EXPECT_TRUE(Got().targetXP && Got().diagnostics && Got().translateOnly && Got().rebuildAll);
+  EXPECT_TRUE(Got().targetXP && Got().diagnostics && Got().translateOnly && Got().rebuildAll && Got().modernCpp);
   EXPECT_FALSE(Got().defaultToDll || Got().exportPublicHeaders || Got().repackageExecutableTargets);
   EXPECT_FALSE(Got().solutionContainsPrepackagedProjects || Got().makeTranslatedFilesReadOnly);
   EXPECT_FALSE(Got().makeExportedHeaderFilesReadOnly || Got().writeTokenEquivalent);

@@ -1,5 +1,6 @@
 // Scanner, literals and sections.
 #include "fuzz/fuzz_world.h"
+#include "lex/cpp_literals.h"
 #include "lex/literals.h"
 #include "lex/sections.h"
 
@@ -7,22 +8,20 @@ using namespace qrex;
 
 namespace {
 
-void Decode(const LexToken& token) {
+void Decode(const LexToken& token, Dialect dialect) {
   std::string text;
   switch (token.kind) {
     case kDecimal:
-      DecimalValue64(token);
-      DecimalValue32(token);
-      break;
     case kHex:
-      HexValue64(token);
+      fuzz::Run([&] { IntegerValue(token, dialect); });
       break;
     case kFloat:
-      FloatValue(token);
+      fuzz::Run([&] { FloatValue(token, dialect); });
       break;
     case kDoubleQuoted:
     case kSingleQuoted:
-      DecodeString(token, text);
+    case kRawString:
+      DecodeString(token, dialect, text);
       EscapedString(text);
       break;
     default:
@@ -30,14 +29,10 @@ void Decode(const LexToken& token) {
   }
 }
 
-}  // namespace
-
-extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
-  const std::string text(reinterpret_cast<const char*>(data), size);
-  const LexScanner whole{std::string_view(text)};
+void ScanAll(const LexScanner& whole) {
   fuzz::Run([&] {
     LexScanner scanner = whole;
-    for (LexToken token; (token = NextToken(scanner, true)).kind != kEndOfText;) Decode(token);
+    for (LexToken token; (token = NextToken(scanner, true)).kind != kEndOfText;) Decode(token, whole.dialect);
     if (!SameTokens(whole, whole)) __builtin_trap();
   });
   fuzz::Run([&] {
@@ -58,5 +53,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
     std::string decoded;
     ReadQuotedText(scanner, decoded);
   });
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
+  const std::string text(reinterpret_cast<const char*>(data), size);
+  ScanAll(LexScanner(std::string_view(text), Dialect::Qrex));
+  ScanAll(LexScanner(std::string_view(text), Dialect::Cpp));
   return 0;
 }

@@ -4,6 +4,7 @@
 
 #include <gtest/gtest.h>
 
+#include "lex/cpp_literals.h"
 #include "lex/literals.h"
 #include "lex/sections.h"
 
@@ -236,6 +237,76 @@ TEST(SectionsTest, Blocks) {
   EXPECT_EQ("Met EOS before closing } at 1", block("{"));
   EXPECT_EQ("Met EOS while reading bracketted string at 4", block("(a()", true));
   EXPECT_EQ("Met EOS before closing } at 3", block("\n{ "));
+}
+
+// C++ text: what a compiler takes is a token, and nothing that it would skip fails.
+std::string CppTokens(const std::string& text) {
+  std::string tokens;
+  LexScanner scanner(std::string_view(text), Dialect::Cpp);
+  try {
+    for (LexToken token; (token = NextToken(scanner)).kind != kEndOfText;) {
+      tokens += (tokens.empty() ? "" : "  ") + std::to_string(token.kind - 10000) + " " + token.text.Text();
+    }
+    return tokens;
+  } catch (const LexScannerException& exception) {
+    return tokens + "  !" + exception.message + " at " + std::to_string(exception.position - text.data());
+  }
+}
+
+TEST(CppScannerTest, Numbers) {
+  EXPECT_EQ("5 1.  5 .5f  5 0x1p-3  3 0b1  3 1'000'000  3 10_km  4 0xE+1",
+            CppTokens("1. .5f 0x1p-3 0b1 1'000'000 10_km 0xE+1"));
+  EXPECT_EQ("4 0x  65 #  65 #  8 x  5 1.5.2  5 1e+5L  29 +  3 1", CppTokens("0x##x 1.5.2 1e+5L +1"));
+  EXPECT_EQ("52 .  52 .  52 .  52 .  8 x  3 1  67 ' ", CppTokens("....x 1' "));
+  const auto value = [](const char* text, int32_t kind) {
+    return IntegerValue({kind, TextRange(std::string_view(text))}, Dialect::Cpp);
+  };
+  EXPECT_EQ(1000u, value("1'000ull", kDecimal));
+  EXPECT_EQ(5u, value("0b1'01", kDecimal));
+  EXPECT_EQ(8u, value("010", kDecimal));
+  EXPECT_EQ(0u, value("0", kDecimal));
+  EXPECT_EQ(255u, value("0xF'Fu", kHex));
+  EXPECT_THROW(value("10_km", kDecimal), LexScannerException);
+  EXPECT_EQ(1000.5, FloatValue({kFloat, TextRange(std::string_view("1'000.5f"))}, Dialect::Cpp));
+}
+
+TEST(CppScannerTest, Strings) {
+  EXPECT_EQ("7 u8\"a\"  6 L'b'  7 \"\\q\\u00e9\\\\\"  6 '\\''  8 r  7 \"\"  8 R  6 'x'  8 Lx  7 \"\"  7 \"a\\\nb\"",
+            CppTokens("u8\"a\" L'b' \"\\q\\u00e9\\\\\" '\\'' r\"\" R'x' Lx\"\" \"a\\\nb\""));
+  EXPECT_EQ("66 R\"()\"  66 u8R\"x(\")\"\n}'@$)x\"  8 s", CppTokens("R\"()\" u8R\"x(\")\"\n}'@$)x\"s"));
+  EXPECT_EQ("8 R  7 \"a b(\"  8 xR  7 \"(\"", CppTokens("R\"a b(\" xR\"(\""));
+  EXPECT_EQ("8 a  !Met EOS within raw string R\"d( at 2", CppTokens("a R\"d( )\""));
+  EXPECT_EQ("65 #  8 error  8 don  67 't \"do\" {  8 x  67 \"open  8 y",
+            CppTokens("#error don't \"do\" {\nx\n\"open\ny"));
+  EXPECT_EQ("67 \"\\", CppTokens("\"\\"));
+  const auto decode = [](const std::string& text, int32_t kind = kDoubleQuoted) {
+    std::string decoded = "old";
+    DecodeString({kind, TextRange(std::string_view(text))}, Dialect::Cpp, decoded);
+    return decoded;
+  };
+  EXPECT_EQ("a\tAA\xC3\xA9\xE2\x82\xAC\xF0\x9F\x98\x80q\"b",
+            decode("u8\"a\\t\\101\\x41\\u00e9\\u20AC\\U0001F600\\q\\\"\\\nb\""));
+  EXPECT_EQ("a)\"\\n", decode("LR\"x(a)\"\\n)x\"", kRawString));
+  EXPECT_EQ("", decode("R\"()\"", kRawString));
+}
+
+TEST(CppScannerTest, WordsAndOperators) {
+  EXPECT_EQ("37 ++  35 =  21 &&  35 =  24 <<=  14 <=  10 >", CppTokens("++= &&= <<= <=>"));
+  EXPECT_EQ(
+      "8 gr\xC3\xB6\xC3\x9F"
+      "e  67 \x7f  67 \x1a  8 b",
+      CppTokens("gr\xC3\xB6\xC3\x9F"
+                "e \x7f\x1a // it's \\\n more '\nb"));
+}
+
+TEST(CppScannerTest, Sections) {
+  const std::string text = "R\"(})\" '}' } rest";
+  LexScanner scanner(std::string_view(text), Dialect::Cpp);
+  EXPECT_EQ("R\"(})\" '}'", ReadSection(scanner, true, kOpenBrace, kCloseBrace).Text());
+  const std::string line = "a R\"(\n)\" b\nc";
+  LexScanner ofLine(std::string_view(line), Dialect::Cpp);
+  int indent;
+  EXPECT_EQ("a R\"(\n)\" b", ReadBraceBlock(ofLine, indent).Text());
 }
 
 }  // namespace qrex

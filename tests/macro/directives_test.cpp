@@ -163,6 +163,21 @@ TEST_F(DirectivesTest, ChecksAndPaths) {
   });
 }
 
+// The text of a C++ file is scanned as C++; what stands in the parentheses of a directive's expression is not.
+TEST_F(DirectivesTest, CppText) {
+  frame.dialect = Dialect::Cpp;
+  frame.DefineSubstitution("v", "1");
+  frame.AddVariable(std::make_unique<LSVar>("m", "M"));
+  EXPECT_EQ("R\"(m $(v) @if })\" u8\"m 1\" 1'0 M // m", Expand("R\"(m $(v) @if })\" u8\"m $(v)\" 1'0 m // m"));
+  EXPECT_EQ("#error don't { M\nM", Expand("#error don't { M\nm"));
+  EXPECT_EQ("[R\"(,)\"][1'0,]", Expand("@def f(a, b) = [a][b]\nf(R\"(,)\", `1'0,`)"));
+  EXPECT_EQ("  R\"(\n a\n)\";\n  b", Expand("  @scope\n{\n    R\"(\n a\n)\";\n    b\n}"));
+  EXPECT_EQ("[R\"(\n})\"]", Expand("@def r = [R\"(\n})\"]\nr"));
+  EXPECT_EQ("yes a\\", Expand("@if (R\"a\\\" == \"a\\\\\") yes@@ @(R\"a\\\")"));
+  EXPECT_EQ("t(4) : Expected digit (not ')') after decimal point (ie after reading '1.')",
+            Expand("R\"(\n\n)\"\n@(1.)"));
+}
+
 TEST_F(DirectivesTest, Prints) {
   ::testing::internal::CaptureStdout();
   const std::string expansion = Expand("@def a = 1\n  @print(a)\n@println(b  \"c\" a)\nx");

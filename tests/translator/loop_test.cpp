@@ -69,6 +69,46 @@ TEST_F(LoopTest, NameSpacesAndBraces) {
   EXPECT_NE(std::string::npos, generated.tail.find("namespace \n{\n    vesk::ReflectedEnum const& _GetReflected(G"));
 }
 
+// With the key; without it, each is the error that it always was.
+TEST_F(LoopTest, CppOfToday) {
+  const std::string text =
+      "#error don't\n#if 0\nit's \"\n#endif\nauto s = R\"x({ $class @if \"\n)x\";\nint gr\xC3\xB6\xC3\x9F = 1'000 + "
+      "0x##x;"
+      "\nx = y++ += '\\101'; // }\n}\nnamespace a {\n}\n} $enum+ E { v };\n";
+  EXPECT_EQ("a.cpp(1) : error : Met line feed within single quoted string after reading 't", ErrorOf("a.cpp", text));
+  settings.modernCpp = true;
+  const std::string plain = text.substr(0, text.find("$enum"));
+  EXPECT_EQ(plain, Translate("b.cpp", plain));
+  EXPECT_EQ(plain, Translate("c.cpp", "\xEF\xBB\xBF" + plain));
+  EXPECT_TRUE(TranslateHeader(text).tail.find("//### $enum+ E\n") != std::string::npos);
+  EXPECT_EQ("d.cpp(3) : error : Met EOS within raw string R\"(", ErrorOf("d.cpp", "R\"(\n)\"\nR\"("));
+  EXPECT_EQ("e.cpp(4) : error : '$x' is not a valid directive", ErrorOf("e.cpp", "\xEF\xBB\xBFR\"(\n)\"\n\n$x"));
+  EXPECT_EQ("f.py(1) : error : Met line feed within single quoted string after reading 't", ErrorOf("f.py", "don't\n"));
+}
+
+TEST_F(LoopTest, WordsOfCppInDeclarations) {
+  const std::string trailing = "$function+ auto f() -> int32 { return 1; }";
+  EXPECT_EQ("a.h(1) : error : Unrecognised identifier : auto", ErrorOf("a.h", trailing));
+  settings.modernCpp = true;
+  EXPECT_EQ(
+      "b.h(1) : error : Unrecognised identifier : auto\n"
+      "    auto: a declaration names its type: write it out, ahead of the name",
+      ErrorOf("b.h", trailing));
+  auto advice = [&, n = 0](const std::string& text) mutable {
+    const std::string error = ErrorOf("c" + std::to_string(n++) + ".h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);
+    const size_t line = error.find("\n    ");
+    return line == std::string::npos ? "none: " + error : error.substr(line + 5, error.find(':', line) - line - 5);
+  };
+  EXPECT_EQ("noexcept", advice("$function+ int32 f() noexcept { return 1; }"));
+  EXPECT_EQ("constexpr", advice("$var+ constexpr int32 x = 1;"));
+  EXPECT_EQ("[[", advice("$function+ [[nodiscard]] int32 f() { return 1; }"));
+  EXPECT_EQ("=", advice("$model+ M { int32 x = 1; };"));
+  EXPECT_EQ("none", advice("$function+ autos f() { }").substr(0, 4));
+  const std::string passes = "[[nodiscard]] constexpr vesk::int32 f() { return 1; }";
+  EXPECT_NE(std::string::npos,
+            Translate("d.h", "[[nodiscard]] constexpr $function+ int32 f() { return 1; }").find(passes));
+}
+
 TEST_F(LoopTest, DollarNew) {
   EXPECT_EQ("p = vesk::DollarNew(new a::b<c>(d));\nq = vesk::DollarNew(new  T );{}",
             Translate("t.cpp", "p = $new a::b<c>(d);\nq = $new  T ;{}"));

@@ -118,6 +118,14 @@ void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded)
   out.Flush();
 }
 
+TextRange SourceOf(const ScannedFile& file) {
+  constexpr std::string_view kByteOrderMark = "\xEF\xBB\xBF";
+  TextRange source{std::string_view(file.sourceText)};
+  const bool isMarked = file.frame.dialect == Dialect::Cpp && source.View().starts_with(kByteOrderMark);
+  if (isMarked) source.begin += kByteOrderMark.size();
+  return source;
+}
+
 }  // namespace
 
 void TranslateFile(ScannedFile& file, IOutputStream& target) {
@@ -126,8 +134,7 @@ void TranslateFile(ScannedFile& file, IOutputStream& target) {
   TextRange expanded;
   try {
     Importer importer(file);
-    expanded = ExpandWithMap(&importer, file.frame, TextRange(std::string_view(file.sourceText)), 0, 0,
-                             file.expandedText, file.expansionMap);
+    expanded = ExpandWithMap(&importer, file.frame, SourceOf(file), 0, 0, file.expandedText, file.expansionMap);
     TranslateText(file, target, expanded);
   } catch (LexScannerException& exception) {
     MapErrorPosition(file.expansionMap, expanded, exception);
@@ -158,12 +165,12 @@ void PrepareTarget(const std::string& path) {
   ChangeReadOnly(path, false);
 }
 
-bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated) {
+bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated, Dialect dialect) {
   std::string old;
   if (!ReadWholeFile(old, path)) return false;
   const std::string text = generated.Text();
   try {
-    return SameTokens(LexScanner(std::string_view(old)), LexScanner(std::string_view(text)));
+    return SameTokens(LexScanner(std::string_view(old), dialect), LexScanner(std::string_view(text), dialect));
   } catch (const LexScannerException&) {
     return false;  // the old file is not C++ that the scanner accepts
   }
@@ -219,7 +226,7 @@ void WriteTranslation(ScannedFile& file, const std::string& target) {
   if (!file.needsWriting) return;
 
   const ConfigSettings& settings = file.host.Settings();
-  const bool isWritten = settings.writeTokenEquivalent || !IsTokenEquivalent(target, generated);
+  const bool isWritten = settings.writeTokenEquivalent || !IsTokenEquivalent(target, generated, file.frame.dialect);
   if (!isWritten) {
     if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
   } else {

@@ -3,7 +3,7 @@
 
 #include <algorithm>
 
-#include "lex/literals.h"
+#include "lex/cpp_literals.h"
 #include "translator/emit/emit.h"
 #include "translator/model/model.h"
 #include "translator/reader/qrex_parser.h"
@@ -171,7 +171,7 @@ void ModelBlock::ParseRelease(int64_t& previous) {
   if (!m_parser.Is(kDecimal) && !m_parser.Is(kHex)) {
     m_parser.Fail("Release number expected when read " + Printed(m_parser.current));
   }
-  const uint64_t value = m_parser.Is(kHex) ? HexValue64(m_parser.current) : DecimalValue32(m_parser.current);
+  const uint64_t value = IntegerValue(m_parser.current, m_parser.scanner.dialect);
   const int64_t release = static_cast<int32_t>(value);
   if (release <= previous) {
     m_parser.Fail("Unexpected release number " + std::to_string(release) + " (must strictly increase)");

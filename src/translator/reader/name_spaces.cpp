@@ -104,7 +104,11 @@ void QrexParser::OpenNameSpace() {
 }
 
 void QrexParser::CloseBrace() {
-  if (m_braceDepth < 1) Fail("Can't match }");
+  if (m_braceDepth < 1) {
+    if (scanner.dialect == Dialect::Qrex) Fail("Can't match }");
+    Advance();  // branches of an #if may close the same brace
+    return;
+  }
   Advance();
   if (--m_braceDepth == 0 && !m_savedDepths.empty()) {
     m_braceDepth = m_savedDepths.back().braces;

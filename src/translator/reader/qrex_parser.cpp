@@ -3,9 +3,10 @@
 #include <algorithm>
 #include <cstring>
 
-#include "lex/literals.h"
+#include "lex/cpp_literals.h"
 #include "lex/sections.h"
 #include "text/paths.h"
+#include "translator/reader/cpp_words.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -54,7 +55,7 @@ QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWr
       m_keywords(keywords),
       m_copyPosition(expanded.begin),
       m_nameSpaces{file.rootNameSpace.get()} {
-  SetInput(expanded);
+  SetInput(expanded, file.frame.dialect);
 }
 
 void QrexParser::CopyTo(const char* position) {
@@ -116,7 +117,7 @@ void QrexParser::CheckInclude() {
   Advance();
   if (!AcceptWord("include") || !Is(kDoubleQuoted)) return;
   std::string path;
-  DecodeString(current, path);
+  DecodeString(current, scanner.dialect, path);
   const ProjectFile* included = file.ResolveImport(path);
   if (included && included->project->usesQrex) Fail("#include should be replaced by @import");
 }
@@ -130,7 +131,7 @@ bool QrexParser::TranslateAt() {
   out << "#include ";
   if (!Is(kDoubleQuoted)) FailExpected("quoted string");
   std::string path;
-  DecodeString(current, path);
+  DecodeString(current, scanner.dialect, path);
   ProjectFile* target = file.ResolveImport(path);
   if (!target) Fail("Can't import file: " + path);
   const ScannedFile& imported = file.host.GetScannedFile(*target);
@@ -143,7 +144,12 @@ bool QrexParser::TranslateAt() {
 void QrexParser::Dispatch() {
   for (const Keyword& keyword : m_keywords.fileLevel) {
     if (!Is(keyword.word)) continue;
-    keyword.parse(*this);
+    try {
+      keyword.parse(*this);
+    } catch (LexScannerException& exception) {
+      if (scanner.dialect == Dialect::Cpp) AdviseOnCppWord(expanded, exception);
+      throw;
+    }
     if (keyword.endsOn == EndsOn::LastToken) Advance();
     return;
   }

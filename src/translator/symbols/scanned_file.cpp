@@ -40,6 +40,8 @@ ScannedFile::ScannedFile(TranslationHost& host, ProjectFile& file)
       index(host.NextFileIndex()),
       rootNameSpace(std::make_unique<NameSpace>(*this, nullptr, "")) {
   importsIObject = IsIObject(file);
+  const bool isCpp = file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::H;
+  if (isCpp && host.Settings().modernCpp) frame.dialect = Dialect::Cpp;
 }
 
 std::string ScannedFile::SourcePath() const { return file.project->SourcePath(file); }
@@ -82,6 +84,8 @@ void ScannedFile::ForgetTranslation() {
   imports.clear();
   importClosure = {};
   importsIObject = IsIObject(file);
+  const bool isCpp = file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::H;
+  if (isCpp && host.Settings().modernCpp) frame.dialect = Dialect::Cpp;
 }
 
 bool ScannedFile::HasTail() const {
