@@ -14,9 +14,9 @@
 // The version of this library: major * 10000 + minor * 100 + patch.
 #define VESK_VERSION 10100
 
-// Records list the offsets of fields of classes with bases, and functors are ordered by their functions. Every supported
-// compiler does with these what is expected. The text that is warned of stands in the sources of the user, so what keeps
-// the warnings away reaches all that follows; who wants them defines VESK_KEEP_WARNINGS.
+// Records list the offsets of fields of classes with bases, and functors are ordered by their functions. Every
+// supported compiler does with these what is expected. The text that is warned of stands in the sources of the user, so
+// what keeps the warnings away reaches all that follows; who wants them defines VESK_KEEP_WARNINGS.
 #ifndef VESK_KEEP_WARNINGS
 #pragma GCC diagnostic ignored "-Winvalid-offsetof"
 #ifdef __clang__
@@ -65,8 +65,8 @@ constexpr NullInterface null = {};
 }  // namespace vesk
 
 // Generated text spells scalar types without a name space in some places, and so may the signatures of `$` members. A
-// header that has names like these in the global name space can stand beside it: an ambiguous name must then be qualified
-// where it is used.
+// header that has names like these in the global name space can stand beside it: an ambiguous name must then be
+// qualified where it is used.
 namespace vesk {
 namespace scalars {
 using vesk::char16;

@@ -2,7 +2,6 @@
 // own so that every reflected type prints, containers included. Numbers of 8 bits print as numbers, bool as a word.
 
 @import "Vesk/vxObject/Platform.h"
-
 #include <algorithm>
 #include <charconv>
 #include <iostream>
@@ -68,6 +67,12 @@ class xostream {
 
   void ChangeIndent(int by) { m_indent += by; }
 
+  // For what only a std::ostream prints; no indentation there.
+  std::ostream& Target() {
+    if (!m_target && !m_stream) m_stream = std::make_unique<MemoryStream>(*this);
+    return m_target ? *m_target : *m_stream;
+  }
+
   // What was written into memory; it begins anew.
   xstring TakeText() {
     m_text.resize(std::exchange(m_size, 0));
@@ -75,6 +80,21 @@ class xostream {
   }
 
  private:
+  struct MemoryStream : private std::streambuf, public std::ostream {
+    typedef std::char_traits<char> traits_type;
+    explicit MemoryStream(xostream& text) : std::ostream(this), m_text(text) {}
+    std::streamsize xsputn(char const* text, std::streamsize size) override {
+      m_text.Append(std::string_view(text, static_cast<std::size_t>(size)));
+      return size;
+    }
+    int overflow(int c) override {
+      const char character = static_cast<char>(c);
+      if (c != traits_type::eof()) m_text.Append(std::string_view(&character, 1));
+      return 0;
+    }
+    xostream& m_text;
+  };
+
   enum { MostDigits = 64 };
 
   void Append(std::string_view text) {
@@ -89,6 +109,7 @@ class xostream {
   void Grow(std::size_t by) { m_text.resize(std::max(2 * m_text.size(), m_size + by + 64)); }
 
   std::ostream* m_target;
+  std::unique_ptr<MemoryStream> m_stream;
   std::string m_text;  // with room behind what was written
   std::size_t m_size = 0;
   int m_indent = 0;

@@ -1,4 +1,4 @@
-// Objects in archives and on the heap: long chains, what a refused archive leaves, archives of before, the heap of $new.
+// Objects in archives and on the heap: long chains, what a refused archive leaves, archives of before, what $new made.
 @import "check.h"
 @import "check/src/nodes.h"
 
