@@ -212,7 +212,7 @@ xostream& operator<<(xostream& os, T const& items) {
   os.Write("[");
   bool isFirst = true;
   for (auto const& item : items) {
-    if (!isFirst) os.Write(",");
+    if (!isFirst) os.Write(',');
     isFirst = false;
     os << AsElement<typename ContainerTraits<T>::element_type>(item);
   }
