@@ -36,16 +36,71 @@ def compile_with_clang(workspace, projects, flags):
             workspace.shell(f"clang++ -std=c++17 -fsyntax-only -Wall -Werror {flags} {include} {source}")
 
 
+def translate(binary, workspace_file):
+    """A workspace with a copy of the tree, translated; the folder of what comes of it."""
+    settings = SETTINGS + (f'virtualTree += {{ "{ROOT / "runtime"}" }} workspaces = {{ "{workspace_file}" }} '
+                           'translateOnly = true')
+    workspace = Workspace(binary, {"all.qrex": settings})
+    shutil.copytree(HERE / "runtime" / "tree", workspace.path("tree"))
+    workspace.run("all.qrex")
+    return workspace, "qrexsource/x64/Debug"
+
+
 # An object whose class only inherits being one.
 INHERITED = """#include "check/src/nodes.h"
 struct More : Kept { std::string text; };
 vesk::ptr<vesk::IObject> More() { return new struct More(); }
 """
 
-# Names that a C header may have, and warnings that are the user's.
+# Names that a C header may have.
 NEIGHBOUR = """extern "C" { typedef long long int64; typedef unsigned char uint8; }
 #include "check/src/nodes.h"
 vesk::int64 Sum(vesk::int64 a, ::vesk::uint8 b) { return a + b; }
+"""
+
+# Loads plug-ins and unloads them. "own": the program holds a copy of their project itself.
+HOST = """#include "twice/twice.h"
+#include <dlfcn.h>
+#include <cstdio>
+
+void Register_Project_twice();
+
+template <typename Function>
+Function* Symbol(void* module, const char* name) { return reinterpret_cast<Function*>(dlsym(module, name)); }
+
+const char* Found()
+{
+    vesk::ReflectedClass const* record = vesk::Find<vesk::ReflectedClass>("Twice");
+    return record ? record->m_name : "none";
+}
+
+int main()
+{
+#ifdef OWN
+    Register_Project_twice();
+#endif
+    void* modules[2];
+    for (int i = 0; i < 2; ++i)
+    {
+        modules[i] = dlopen(i == 0 ? "./a.so" : "./b.so", RTLD_NOW | RTLD_LOCAL);
+        if (!modules[i]) return std::puts(dlerror());
+        Symbol<void()>(modules[i], "Load")();
+        vesk::AnyInterface any;
+        Symbol<void(vesk::AnyInterface*)>(modules[i], "Make")(&any);
+        const vesk::ptr<vesk::IObject> object(any);
+#ifdef OWN
+        const vesk::ptr<ITwice> twice = vesk::QueryInterface<ITwice>(object);
+        std::printf("%d ", twice ? twice->Number() : 0);
+#endif
+        object->DestroyObject();
+    }
+    std::printf("%s", Found());
+    dlclose(modules[0]);
+    std::printf(" %s", Found());
+    Symbol<void()>(modules[1], "Unload")();
+    std::printf(" %s\\n", Found());
+    dlclose(modules[1]);
+}
 """
 
 
@@ -56,9 +111,11 @@ def test_every_kind(binary):
         assert int(output.split()[-5]) > 250, output
         for compiler in ("g++", "clang++"):
             need(compiler)
-            compile_one = f"{compiler} -std=c++17 -fsyntax-only -Dshapes_API= -Iqrexsource/x64/Debug -Wno-deprecated-declarations "
+            compile_one = (f"{compiler} -std=c++17 -fsyntax-only -Dshapes_API= -Iqrexsource/x64/Debug "
+                           "-Wno-deprecated-declarations ")
             workspace.write("inherited.cpp", INHERITED)
-            holds(workspace.shell(compile_one + "inherited.cpp", status=1), "archived, collected and destroyed as that base")
+            holds(workspace.shell(compile_one + "inherited.cpp", status=1),
+                  "archived, collected and destroyed as that base")
             workspace.write("neighbour.cpp", NEIGHBOUR)
             workspace.shell(compile_one + "-Wall -Werror neighbour.cpp")
         # What generated text is warned of: the comparison of structs in variants, what is passed by [copy].
@@ -75,12 +132,8 @@ def test_tour(binary):
 def test_byte_order(binary):
     """Scalars are little-endian in archives; the forced switch turns them around, both ways."""
     need("g++")
-    settings = SETTINGS + (f'virtualTree += {{ "{ROOT / "runtime"}" }} workspaces = {{ "order.qrws" }} '
-                           'translateOnly = true')
-    with Workspace(binary, {"all.qrex": settings}) as workspace:
-        shutil.copytree(HERE / "runtime" / "tree", workspace.path("tree"))
-        workspace.run("all.qrex")
-        root = "qrexsource/x64/Debug"
+    workspace, root = translate(binary, "order.qrws")
+    with workspace:
         compiler = f"g++ -std=c++17 -Wall -Werror -I{root} {root}/order/src/order.cpp {root}/Vesk/vxObject/src/vxObject.cpp"
         plain = workspace.shell(f"{compiler} -o plain && ./plain").splitlines()
         swapped = workspace.shell(f"{compiler} -DVESK_SWAP_SCALARS -o swapped && ./swapped").splitlines()
@@ -93,5 +146,33 @@ def test_byte_order(binary):
                         "[1,0,3,1,99]", "numbers[300]", "nested[k][300]"])
 
 
+def test_threads(binary):
+    """One graph and one archive per thread do not meet."""
+    need("g++")
+    workspace, root = translate(binary, "threads.qrws")
+    with workspace:
+        workspace.shell(f"g++ -std=c++17 -g1 -O1 -fsanitize=thread -I{root} {root}/threads/src/threads.cpp "
+                        f"{root}/Vesk/vxObject/src/vxObject.cpp -o threads")
+        # Some kernels place the program where the sanitizer wants its own memory.
+        equal(workspace.shell("setarch -R ./threads"), "0 0 0 0 0\n")
+
+
+def test_modules(binary):
+    """Two plug-ins and a program that hold copies of one project."""
+    need("g++")
+    workspace, root = translate(binary, "twice.qrws")
+    with workspace:
+        compiler = f"g++ -std=c++17 -Wall -Werror -fPIC -fno-gnu-unique -I{root}"
+        objects = f"{root}/twice/src/twice.cpp {root}/Vesk/vxObject/src/vxObject.cpp"
+        workspace.write("host.cpp", HOST)
+        workspace.shell(f"{compiler} -shared {objects} -o a.so && cp a.so b.so")
+        # A program that exports nothing has a registry of its own; its records and those of the plug-ins are copies.
+        workspace.shell(f"{compiler} -DOWN host.cpp {objects} -o own")
+        equal(workspace.shell("./own"), "7 7 Twice Twice Twice\n")
+        # One that exports its symbols has the registry of all.
+        workspace.shell(f"{compiler} -rdynamic host.cpp {root}/Vesk/vxObject/src/vxObject.cpp -o host")
+        equal(workspace.shell("./host"), "Twice Twice none\n")
+
+
 if __name__ == "__main__":
-    run_tests([test_every_kind, test_tour, test_byte_order])
+    run_tests([test_every_kind, test_tour, test_byte_order, test_threads, test_modules])

@@ -172,7 +172,7 @@ void Serialise(Archive& ar, T const& v) {
   if constexpr (IsBlock<T>) {
     if (v.size() > 0) WriteScalars(ar, &*v.begin(), v.size());
   } else {
-    for (auto const& item : v) ar << item;
+    for (auto const& item : v) ar << AsElement<typename ContainerTraits<T>::element_type>(item);
   }
 }
 template <typename T, typename = std::enable_if_t<IsContainer<T>>, typename = void>

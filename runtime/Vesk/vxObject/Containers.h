@@ -173,6 +173,16 @@ struct ContainerTraits<Array<T, N>> : ContainerTraitsOf<T, false, false> {};
 template <typename T>
 constexpr bool IsContainer = ContainerTraits<T>::is_container;
 
+// What an iterator leads to: a vector of bools gives something that stands for one.
+template <typename E, typename Item>
+decltype(auto) AsElement(Item const& item) {
+  if constexpr (std::is_same<E, bool>::value) {
+    return static_cast<bool>(item);
+  } else {
+    return (item);
+  }
+}
+
 template <typename T>
 using EqualItems = decltype(std::declval<T const&>() == std::declval<T const&>());
 
@@ -202,9 +212,9 @@ xostream& operator<<(xostream& os, T const& items) {
   os.Write("[");
   bool isFirst = true;
   for (auto const& item : items) {
-    if (!isFirst) os.Write(",");
+    if (!isFirst) os.Write(',');
     isFirst = false;
-    os << item;
+    os << AsElement<typename ContainerTraits<T>::element_type>(item);
   }
   os.Write("]");
   return os;

@@ -9,7 +9,6 @@
 // A graph belongs to the thread that reads it: nodes of one thread do not meet those of another.
 
 @import "Vesk/vxObject/GraphState.h"
-
 #include <cstring>
 
 namespace vesk {
@@ -50,8 +49,8 @@ class DGNode {
     if (reader && reader != this) Link(state);
   }
 
-  // Drops the cached value. What depends on it calculates again when it is next read. `force`: whether the node likes it
-  // or not. A node that is being calculated keeps what it has.
+  // Drops the cached value. What depends on it calculates again when it is next read. `force`: whether the node likes
+  // it or not. A node that is being calculated keeps what it has.
   void TryEvict(bool force) const {
     if (m_isEmpty || m_isCalculating || !(force || IsEvictable())) return;
     OnEvict();
@@ -148,8 +147,8 @@ class DGDepNode : public DGNode {
   explicit DGDepNode(int flags = DF_SYNC_DEP) : DGNode(flags) {}
 };
 
-// Tells the node of an `$indep` field from whatever else a record may place at an address: a value that belongs to its
-// own place.
+// Tells the node of an `$indep` field from whatever else a record may place at an address: a value that belongs to
+// its own place.
 class IndepMark {
  public:
   IndepMark() {}
@@ -300,8 +299,8 @@ inline void DGNode::BringUpToDate(GraphState& state) const {
   state.End();
 }
 
-// The outermost read. What would take too much stack comes out of it as a DeepRead: it is then calculated from here, and
-// what wanted it begins again.
+// The outermost read. What would take too much stack comes out of it as a DeepRead: it is then calculated from here,
+// and what wanted it begins again.
 inline void DGNode::Evaluate(GraphState& state) const {
   state.Aim(this);
   while (!state.m_targets.empty()) {
@@ -310,7 +309,9 @@ inline void DGNode::Evaluate(GraphState& state) const {
       target.m_node->Update(state);
     } catch (DeepRead const&) {
       DGNode const* deep = std::exchange(state.m_deep, nullptr);
-      if (!deep || deep == target.m_node) throw GraphError("calculation takes too much stack: " + target.m_node->Name());
+      if (!deep || deep == target.m_node) {
+        throw GraphError("calculation takes too much stack: " + target.m_node->Name());
+      }
       state.Aim(deep);
       continue;
     } catch (...) {

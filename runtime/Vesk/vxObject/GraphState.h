@@ -2,7 +2,6 @@
 // found out, and the eviction queues. It lives as long as the thread or the last node in a queue.
 
 @import "Vesk/vxObject/Visitors.h"
-
 #include <exception>
 #include <unordered_map>
 #include <unordered_set>
@@ -23,14 +22,15 @@ class GraphError : public std::logic_error {
   using std::logic_error::logic_error;
 };
 
-// Unwinds the calculations of an outermost read to where there is stack for what they need next. No std::exception: it is
-// none of their business.
+// Unwinds the calculations of an outermost read to where there is stack for what they need next. No std::exception:
+// it is none of their business.
 struct DeepRead {};
 
 // The stack that calculations within each other may use.
 constexpr std::uintptr_t MostCalculationStack = 256 * 1024;
 
-// One T for each thread. It is there for nodes that outlive the thread's other variables, and gone when nobody uses it.
+// One T for each thread. It is there for nodes that outlive the thread's other variables, and gone when nobody uses
+// it.
 template <typename T>
 class PerThread {
  public:
@@ -157,7 +157,8 @@ struct GraphState : PerThread<GraphState> {
     return target != m_targets.end() && target->m_serial == at->second;
   }
 
-  // Whether what is read next must be calculated further out. Not what the outermost calculation reads: that is there.
+  // Whether what is read next must be calculated further out. Not what the outermost calculation reads: that is
+  // there.
   bool IsDeep() const {
     const std::uintptr_t here = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
     return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > MostCalculationStack;
@@ -179,8 +180,9 @@ struct GraphState : PerThread<GraphState> {
     m_again.erase(node);
     m_failed.erase(node);
     m_unwound.erase(node);
-    m_targets.erase(std::remove_if(m_targets.begin(), m_targets.end(), [=](Target const& t) { return t.m_node == node; }),
-                    m_targets.end());
+    m_targets.erase(
+        std::remove_if(m_targets.begin(), m_targets.end(), [=](Target const& t) { return t.m_node == node; }),
+        m_targets.end());
     for (Calculation* at = m_calculation; at; at = at->m_outer) at->m_inputs.erase(node);
     // What a calculation had made and wanted to read: the calculation itself must begin further out.
     if (m_deep == node) m_deep = m_calculation ? m_calculation->m_node : nullptr;

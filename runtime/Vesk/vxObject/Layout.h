@@ -1,8 +1,8 @@
-// What makes two records of one name the same thing: their layout as text. Two modules of a process may each have a copy
-// of a record (plug-ins that hold the same library, a host that exports no symbols); the copies then stand for one thing.
+// What makes two records of one name the same thing: their layout as text. Two modules of a process may each have a
+// copy of a record (plug-ins that hold the same library, a host that exports no symbols); the copies then stand for one
+// thing.
 
 @import "Vesk/vxObject/ByteCode.h"
-
 #if defined(__linux__)
 #include <link.h>
 #endif
@@ -109,8 +109,8 @@ inline int ModuleOf(void const* address) {
 #endif
 }
 
-// Whether a static object that is being destroyed goes with the whole process, not with a module that is unloaded. The
-// program itself is only ever left at the end; whatever goes after one of its objects goes then as well.
+// Whether a static object that is being destroyed goes with the whole process, not with a module that is unloaded.
+// The program itself is only ever left at the end; whatever goes after one of its objects goes then as well.
 inline bool IsProcessEnding(void const* object) {
   static bool* const isEnding = new bool(false);
   if (ModuleOf(object) <= 0) *isEnding = true;

@@ -2,7 +2,6 @@
 // can reach it. Objects made with `$new` belong to the heap below until it is collected.
 
 @import "Vesk/vxObject/Model.h"
-
 #include <mutex>
 #include <unordered_set>
 
@@ -33,8 +32,8 @@ struct BaseMixin : public B {
 
 // --- The heap of `$new`
 
-// The objects made by `$new` in all threads, until they are collected or their DestroyObject is called. Each call is safe
-// in any thread, but Collect wants that no other thread changes objects meanwhile.
+// The objects made by `$new` in all threads, until they are collected or their DestroyObject is called. Each call is
+// safe in any thread, but Collect wants that no other thread changes objects meanwhile.
 class ObjectHeap : private IObjectVisitor {
  public:
   static ObjectHeap& Get() {
@@ -57,8 +56,8 @@ class ObjectHeap : private IObjectVisitor {
     return static_cast<ssize_t>(m_objects.size());
   }
 
-  // Destroys the objects that cannot be reached from the roots, in the order in which they were made. Answers how many.
-  // A destructor may make objects, and may destroy others that are about to be: they are destroyed once.
+  // Destroys the objects that cannot be reached from the roots, in the order in which they were made. Answers how
+  // many. A destructor may make objects, and may destroy others that are about to be: they are destroyed once.
   ssize_t Collect(xvector<ptr<IObject>> const& roots) {
     m_reached.clear();
     for (ptr<IObject> const& root : roots) VisitObject(root);

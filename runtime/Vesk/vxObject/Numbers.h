@@ -2,7 +2,6 @@
 // read here is checked before anything is made of it, and what a refused archive had made is destroyed.
 
 @import "Vesk/vxObject/Visitors.h"
-
 #include <functional>
 #include <map>
 #include <typeindex>
@@ -15,7 +14,7 @@ namespace vesk {
 
 struct WrittenObject {
   void const* m_object;
-  AnyInterface m_persistable;                    // of an IPersistable object
+  AnyInterface m_persistable;                       // of an IPersistable object
   void (*m_write)(Archive&, WrittenObject const&);  // its content
 };
 
@@ -32,7 +31,7 @@ struct WrittenObjects {
 
   xvector<WrittenObject> m_list;
   std::map<Key, std::size_t> m_numbers;
-  std::size_t m_next = 0;  // the first object whose content is not written yet
+  std::size_t m_next = 0;    // the first object whose content is not written yet
   bool m_isWriting = false;  // who set it writes the contents
 };
 
@@ -68,8 +67,8 @@ struct ReadObjects {
   }
 
   xvector<ReadObject> m_list;
-  std::size_t m_next = 0;  // the first object whose content may have to be read
-  bool m_isReading = false;  // who set it reads the contents
+  std::size_t m_next = 0;                              // the first object whose content may have to be read
+  bool m_isReading = false;                            // who set it reads the contents
   std::function<bool(ReflectedClass const&)> m_allow;  // asked before an object is made; empty: all that fit
 };
 

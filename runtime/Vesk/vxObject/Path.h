@@ -16,7 +16,7 @@ class Path {
   void EndReserveLocal(octet_t* end) { m_size = end - Data(); }
   void EndReserveHeap(octet_t* end) { m_size = end - Data(); }
 
-  octet_t const* Data() const { return m_heap.empty() ? m_local : m_heap.data(); }
+  octet_t const* Data() const { return (m_heap.empty() ? m_local : m_heap.data()) + Ahead; }
   ssize_t Size() const { return m_size; }
   bool Holds(Path const& other) const {
     return m_size <= other.m_size && std::equal(Data(), Data() + m_size, other.Data());
@@ -29,14 +29,18 @@ class Path {
   }
 
  private:
-  octet_t* Data() { return m_heap.empty() ? m_local : m_heap.data(); }
+  // The bytes ahead of a path: with them a key behind one byte, where most are, is aligned. Generated text writes it
+  // there as an integer.
+  enum { Ahead = 7, LocalSize = 16 };
+
+  octet_t* Data() { return (m_heap.empty() ? m_local : m_heap.data()) + Ahead; }
   octet_t* Resize(ssize_t size) {
-    if (size > static_cast<ssize_t>(sizeof(m_local))) m_heap.resize(size);
+    if (size > LocalSize) m_heap.resize(Ahead + size);
     m_size = size;
     return Data();
   }
 
-  octet_t m_local[16];
+  alignas(8) octet_t m_local[Ahead + LocalSize];
   xvector<octet_t> m_heap;
   ssize_t m_size = 0;
 };

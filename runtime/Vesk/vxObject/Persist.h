@@ -252,8 +252,8 @@ xvector<octet_t> WriteObject(ptr<I> const& object) {
   return ar.m_bytes;
 }
 
-// What WriteObject wrote. The objects belong to the caller; the archive is refused (ArchiveError) where the first is no
-// I. `allow` is asked before an object of a class is made.
+// What WriteObject wrote. The objects belong to the caller; the archive is refused (ArchiveError) where the first is
+// no I. `allow` is asked before an object of a class is made.
 template <typename I>
 ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits(),
                   std::function<bool(ReflectedClass const&)> allow = nullptr) {

@@ -14,9 +14,9 @@
 // The version of this library: major * 10000 + minor * 100 + patch.
 #define VESK_VERSION 10100
 
-// Records list the offsets of fields of classes with bases, and functors are ordered by their functions. Every supported
-// compiler does with these what is expected. The text that is warned of stands in the sources of the user, so what keeps
-// the warnings away reaches all that follows; who wants them defines VESK_KEEP_WARNINGS.
+// Records list the offsets of fields of classes with bases, and functors are ordered by their functions. Every
+// supported compiler does with these what is expected. The text that is warned of stands in the sources of the user, so
+// what keeps the warnings away reaches all that follows; who wants them defines VESK_KEEP_WARNINGS.
 #ifndef VESK_KEEP_WARNINGS
 #pragma GCC diagnostic ignored "-Winvalid-offsetof"
 #ifdef __clang__
@@ -65,8 +65,8 @@ constexpr NullInterface null = {};
 }  // namespace vesk
 
 // Generated text spells scalar types without a name space in some places, and so may the signatures of `$` members. A
-// header that has names like these in the global name space can stand beside it: an ambiguous name must then be qualified
-// where it is used.
+// header that has names like these in the global name space can stand beside it: an ambiguous name must then be
+// qualified where it is used.
 namespace vesk {
 namespace scalars {
 using vesk::char16;
@@ -137,14 +137,21 @@ class auto_ptr {
 #define CONST_ATTRIB_CAST(CLS, MEMBER) \
   (reinterpret_cast<CLS const*>(reinterpret_cast<char const*>(this) - VX_MEMBER_OFFSET(CLS, MEMBER)))
 
-// The storage of a variant: as large as its largest item. The number in the name is that of the items; it is kept behind
-// the storage, so that whoever reads a tag knows which there are.
+// The storage of a variant: as large as its largest item, and aligned for it. The number in the name is that of the
+// items; it is kept behind the storage, so that whoever reads a tag knows which there are.
 namespace vesk {
 template <typename... Sizes>
 constexpr std::size_t MaxSize(Sizes... sizes) {
   std::size_t most = 1;
   ((most = static_cast<std::size_t>(sizes) > most ? static_cast<std::size_t>(sizes) : most), ...);
   return most;
+}
+// As all types but those of 16 byte integers need it.
+template <typename... Sizes>
+constexpr std::size_t VariantAlignment(Sizes... sizes) {
+  std::size_t alignment = 1;
+  while (alignment < 8 && 2 * alignment <= MaxSize(sizes...)) alignment *= 2;
+  return alignment;
 }
 }  // namespace vesk
 
@@ -154,7 +161,7 @@ constexpr std::size_t MaxSize(Sizes... sizes) {
     @while (items <= 64)
     {
         #define VESK_MAX@@@(items)(...) \
-          ::vesk::MaxSize(__VA_ARGS__)]; \
+          ::vesk::MaxSize(__VA_ARGS__)] __attribute__((aligned(::vesk::VariantAlignment(__VA_ARGS__)))); \
           public: \
           enum { _vesk_items_ = @@@(items) }; \
           private: \

@@ -182,8 +182,8 @@ struct ReflectedAttribute {
 
 struct ReflectedInterface;
 
-// The address of an interface's record, as `&record` gives it. It is a pointer, except that it equals that of a copy: of
-// a record of the same name and layout in another module of the process (Registry.h compares them).
+// The address of an interface's record, as `&record` gives it. It is a pointer, except that it equals that of a copy:
+// of a record of the same name and layout in another module of the process (Layout.h compares them).
 class InterfaceRecord {
  public:
   InterfaceRecord(ReflectedInterface const* record) : m_record(record) {}

@@ -6,7 +6,8 @@
 
 namespace vesk {
 
-// A project at run time: vxDefineTarget (Model.h) makes it. Where its module is unloaded, what it registered goes with it.
+// A project at run time: vxDefineTarget (Model.h) makes it. Where its module is unloaded, what it registered goes
+// with it.
 struct XTarget {
   XTarget(ConstStringZ name, RSN rsn) : m_name(name), m_rsn(rsn) {}
   ~XTarget();
@@ -120,8 +121,8 @@ inline TypeOps const* FindTypeOps(ReflectedType const& type) {
 
 inline TypeOps const* FindTypeOps(ReflectionByteCode code) { return FindTypeOps(DecodeType(code)); }
 
-// Prints a value known only by its type: an enumeration by its label, the items of containers one by one, "?" when the
-// type is not registered.
+// Prints a value known only by its type: an enumeration by its label, the items of containers one by one, "?" when
+// the type is not registered.
 inline void PrintValue(xostream& os, ReflectedType const& type, void const* value) {
   if (type.m_code == RC_ENUM) {
     PrintEnum(os, Find<ReflectedEnum>(type.m_name), *static_cast<int32 const*>(value));

@@ -1,14 +1,15 @@
-// Sources: the fields of models that calculations have read, found again by what a write says of a field. A source lives
-// as long as someone depends on it. A read adds one source, a write looks up a few places, however many there are.
+// Sources: the fields of models that calculations have read, found again by what a write says of a field. A source
+// lives as long as someone depends on it. A read adds one source, a write looks up a few places, however many there
+// are.
 
 @import "Vesk/vxObject/Graph.h"
 @import "Vesk/vxObject/Path.h"
 
 namespace vesk {
 
-// Fields without a path are known by their memory. Elements of a map or a dynamic array have memory of their own; they and
-// their container find each other by the name of the field ("Doc::_model_.size.width", "Doc::_model_.notes[_k0]"), within
-// the object where the barrier knows it.
+// Fields without a path are known by their memory. Elements of a map or a dynamic array have memory of their own;
+// they and their container find each other by the name of the field ("Doc::_model_.size.width",
+// "Doc::_model_.notes[_k0]"), within the object where the barrier knows it.
 class DataSource : public DGIndepNode {
  public:
   xstring Name() const override { return m_name->first; }
@@ -112,8 +113,9 @@ class DataSource : public DGIndepNode {
              std::string_view name)
       : m_table(table), m_size(size) {
     const std::string_view field = name.substr(0, name.find('['));
-    m_field = table.m_byField.emplace(std::piecewise_construct, std::forward_as_tuple(object, field),
-                                      std::forward_as_tuple()).first;
+    m_field =
+        table.m_byField.emplace(std::piecewise_construct, std::forward_as_tuple(object, field), std::forward_as_tuple())
+            .first;
     m_name = m_field->second.emplace(name, std::list<DataSource*>()).first;
     m_place = m_name->second.insert(m_name->second.end(), this);
     m_address = addresses.insert({address, this});

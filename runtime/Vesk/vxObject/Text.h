@@ -2,9 +2,9 @@
 // own so that every reflected type prints, containers included. Numbers of 8 bits print as numbers, bool as a word.
 
 @import "Vesk/vxObject/Platform.h"
-
 #include <algorithm>
 #include <charconv>
+#include <cstring>
 #include <iostream>
 #include <string>
 #include <string_view>
@@ -24,73 +24,132 @@ typedef basic_xstring<char8> string8;
 typedef basic_xstring<char16> string16;
 typedef string8 xstring;
 
-// Writes to a std::ostream, or without one into memory.
+// Writes to a std::ostream, or without one into memory. What is written into memory without an indentation is put where
+// there is room for it at once; all else, and where there is none, goes the long way.
 class xostream {
  public:
   explicit xostream(std::ostream& target) : m_target(&target) {}
   xostream() : m_target(nullptr) {}
+  ~xostream() { std::free(m_text); }
   xostream(xostream const&) = delete;
   void operator=(xostream const&) = delete;
 
   void Write(std::string_view text) {
+    if (text.size() > static_cast<std::size_t>(m_end - m_at)) return WriteLines(text);
     if (text.empty()) return;
-    if (m_indent == 0) {
-      Append(text);
-      m_atLineStart = text.back() == '\n';
+    std::memcpy(m_at, text.data(), text.size());
+    m_at += text.size();
+  }
+  void Write(char8 c) {
+    if (m_at == m_end) return WriteLines(std::string_view(&c, 1));
+    *m_at++ = c;
+  }
+
+  // In the shortest form that reads back as the same number, whatever the locale.
+  template <typename T>
+  void WriteNumber(T value) {
+    if (m_end - m_at >= MostDigits) {
+      m_at = std::to_chars(m_at, m_at + MostDigits, value).ptr;
       return;
     }
+    char text[MostDigits];
+    WriteLines(std::string_view(text, std::to_chars(text, text + MostDigits, value).ptr - text));
+  }
+
+  void ChangeIndent(int by) {
+    TakeRoom();
+    m_indent += by;
+    OfferRoom();
+  }
+
+  // For what only a std::ostream prints; no indentation there.
+  std::ostream& Target() {
+    if (!m_target && !m_stream) m_stream = std::make_unique<MemoryStream>(*this);
+    return m_target ? *m_target : *m_stream;
+  }
+
+  // What was written into memory; it begins anew.
+  xstring TakeText() {
+    TakeRoom();
+    return std::string(m_text ? m_text : "", std::exchange(m_size, 0));
+  }
+
+ private:
+  struct MemoryStream : private std::streambuf, public std::ostream {
+    typedef std::char_traits<char> traits_type;
+    explicit MemoryStream(xostream& text) : std::ostream(this), m_text(text) {}
+    std::streamsize xsputn(char const* text, std::streamsize size) override {
+      m_text.TakeRoom();
+      m_text.Append(std::string_view(text, static_cast<std::size_t>(size)));
+      m_text.OfferRoom();
+      return size;
+    }
+    int overflow(int c) override {
+      const char character = static_cast<char>(c);
+      if (c != traits_type::eof()) xsputn(&character, 1);
+      return 0;
+    }
+    xostream& m_text;
+  };
+
+  enum { MostDigits = 64 };
+
+  // The room is m_text behind m_size, as long as it is offered.
+  void OfferRoom() {
+    if (m_target || m_indent != 0 || !m_text) return;
+    m_at = m_text + m_size;
+    m_end = m_text + m_capacity;
+  }
+  void TakeRoom() {
+    if (!m_end) return;
+    const std::size_t size = static_cast<std::size_t>(m_at - m_text);
+    if (size != m_size) m_atLineStart = m_text[size - 1] == '\n';
+    m_size = size;
+    m_at = m_end = nullptr;
+  }
+
+  void WriteLines(std::string_view text) {
+    TakeRoom();
     while (!text.empty()) {
       const std::size_t end = text.find('\n');
       const std::string_view line = text.substr(0, end);
       if (m_atLineStart && !line.empty()) Append(std::string(m_indent, ' '));
       Append(line);
       m_atLineStart = m_atLineStart && line.empty();
-      if (end == std::string_view::npos) return;
+      if (end == std::string_view::npos) break;
       Append("\n");
       m_atLineStart = true;
       text.remove_prefix(end + 1);
     }
+    OfferRoom();
   }
-
-  // In the shortest form that reads back as the same number, whatever the locale.
-  template <typename T>
-  void WriteNumber(T value) {
-    if (m_target || m_indent != 0) {
-      char text[MostDigits];
-      Write(std::string_view(text, std::to_chars(text, text + MostDigits, value).ptr - text));
-      return;
-    }
-    if (m_text.size() - m_size < MostDigits) Grow(MostDigits);
-    char* at = &m_text[m_size];
-    m_size += std::to_chars(at, at + MostDigits, value).ptr - at;
-    m_atLineStart = false;
-  }
-
-  void ChangeIndent(int by) { m_indent += by; }
-
-  // What was written into memory; it begins anew.
-  xstring TakeText() {
-    m_text.resize(std::exchange(m_size, 0));
-    return std::exchange(m_text, std::string());
-  }
-
- private:
-  enum { MostDigits = 64 };
-
   void Append(std::string_view text) {
     if (m_target) {
       m_target->write(text.data(), static_cast<std::streamsize>(text.size()));
       return;
     }
-    if (m_text.size() - m_size < text.size()) Grow(text.size());
-    std::copy(text.begin(), text.end(), &m_text[m_size]);
+    if (text.empty()) return;
+    if (m_capacity - m_size < text.size() + MostDigits) Grow(text.size() + MostDigits);
+    std::memcpy(m_text + m_size, text.data(), text.size());
     m_size += text.size();
   }
-  void Grow(std::size_t by) { m_text.resize(std::max(2 * m_text.size(), m_size + by + 64)); }
 
+  // Large blocks are moved by their pages.
+  void Grow(std::size_t by) {
+    const std::size_t capacity = std::max(2 * m_capacity, m_size + by);
+    void* text = std::realloc(m_text, capacity);
+    if (!text) throw std::bad_alloc();
+    m_text = static_cast<char*>(text);
+    m_capacity = capacity;
+  }
+
+  char* m_at = nullptr;
+  char* m_end = nullptr;
   std::ostream* m_target;
-  std::string m_text;  // with room behind what was written
+  std::unique_ptr<MemoryStream> m_stream;
+  char* m_text = nullptr;
   std::size_t m_size = 0;
+  std::size_t m_capacity = 0;
   int m_indent = 0;
   bool m_atLineStart = true;
 };
@@ -156,7 +215,7 @@ xostream& operator<<(xostream& os, T value) {
   if constexpr (std::is_same<T, bool>::value) {
     os.Write(value ? "true" : "false");
   } else if constexpr (std::is_same<T, char8>::value) {
-    os.Write(std::string_view(&value, 1));
+    os.Write(value);
   } else if constexpr (std::is_same<T, char16>::value) {
     os.Write(Utf8Text(std::u16string_view(&value, 1)));
   } else if constexpr (sizeof(T) == 16 && !std::is_floating_point<T>::value) {

@@ -139,7 +139,8 @@ void CheckGraphThreads()
                 field.a = i;
                 sums.x = i;
                 all[i].one = &sums;
-                result = chain.back().depth + w.ofField + sums.b + all[i].later(i) + int32(vesk::RunAsyncCalculations());
+                result = chain.back().depth + w.ofField + sums.b + all[i].later(i);
+                result += int32(vesk::RunAsyncCalculations());
             }
             vesk::EvictionQueue::Get(0).EvictDownTo(-1);
             result += changes + int32(vesk::EvictionQueue::Get(0).Count());

@@ -107,11 +107,21 @@ $struct Watcher
     Around* around = nullptr;
     Operated* operated = nullptr;
     int32 cells = 0;
-    $dep int32 ofField = { ++calculated; ofField = field->a; for (int i = 0; i < cells; ++i) ofField += field->cells[i]; };
+    $dep int32 ofField =
+    {
+        ++calculated;
+        ofField = field->a;
+        for (int i = 0; i < cells; ++i) ofField += field->cells[i];
+    };
     $dep int32 ofMap = { ++calculated; ofMap = int32(field->map.read().size()); };
     $dep int32 ofElement = { ++calculated; ofElement = plain->maps[1][2]; };
     $dep int32 ofAround = { ++calculated; ofAround = int32(around->inner.read().maps.read().size()); };
-    $dep int32 ofOperated = { ++calculated; ofOperated = 0; for (int i = 0; i < cells; ++i) ofOperated += operated->map[i]; };
+    $dep int32 ofOperated =
+    {
+        ++calculated;
+        ofOperated = 0;
+        for (int i = 0; i < cells; ++i) ofOperated += operated->map[i];
+    };
     $dep int32 ofWords = { ++calculated; ofWords = operated->words["a"] + operated->size.read().width; };
     mutable int32 calculated = 0;
 };

@@ -9,7 +9,8 @@ void CheckTexts()
 {
     char text[] = "text";
     CHECK(text, "text");
-    CHECK(vxMakeString(0.1 << ' ' << 0.1f << ' ' << 1e300 << ' ' << 2.0 << ' ' << 123456789.25), "0.1 0.1 1e+300 2 123456789.25");
+    CHECK(vxMakeString(0.1 << ' ' << 0.1f << ' ' << 1e300 << ' ' << 2.0 << ' ' << 123456789.25),
+          "0.1 0.1 1e+300 2 123456789.25");
     CHECK(vxMakeString(int8(-5) << ' ' << vesk::uint64(-1) << ' ' << true << 'c'), "-5 18446744073709551615 truec");
     struct Grouping : std::numpunct<char>
     {
