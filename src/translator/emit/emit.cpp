@@ -6,6 +6,14 @@
 
 namespace qrex {
 
+void WriteIndentedText(TextWriter& out, std::string_view text, size_t blanks) {
+  for (size_t lineFeed; (lineFeed = text.find('\n')) != std::string_view::npos && lineFeed + 1 < text.size();
+       text.remove_prefix(lineFeed + 1)) {
+    out << text.substr(0, lineFeed + 1) << kBlanks.substr(0, blanks);
+  }
+  out << text;
+}
+
 Block::Block(TextWriter& out, std::string_view suffix) : m_out(out), m_suffix(suffix) {
   m_out << "{\n";
   m_out.Flush();

@@ -7,6 +7,7 @@
 #include <string_view>
 
 #include "text/text_writer.h"
+#include "translator/emit/write.h"
 #include "translator/symbols/name_space.h"
 #include "translator/types/type_view.h"
 
@@ -24,6 +25,9 @@ class Block {
   TextWriter& m_out;
   std::string m_suffix;
 };
+
+// A hole may be a type.
+inline void WriteValue(TextWriter& out, TypeView type) { PrintType(out, type); }
 
 // Opens the name spaces around an element, outermost first ("namespace N\n{\n"), and closes them ("} // N\n").
 class NameSpaceFrame {
