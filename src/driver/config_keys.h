@@ -41,6 +41,7 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"writeTokenEquivalent", &ConfigSettings::writeTokenEquivalent,
      "also write a translation that differs in blanks and comments alone"},
     {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
+    {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
 };
 
 inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kListKeys[] = {

@@ -43,6 +43,7 @@ struct ConfigSettings {
   bool makeTranslatedFilesReadOnly = true;
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
+  bool compilableText = false;
   RunMode mode = RunMode::Build;
   std::map<std::string, PlatformEnvironment> platformEnvironments;
 

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "translator/class/text_checks.h"
 #include "translator/declared/class_def.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -17,7 +18,7 @@ void DealWithTextTo(QrexParser& parser, const ClassDef& def, const char* positio
   }
 }
 
-void ParseItem(QrexParser& parser, ClassDef& def) {
+void ParseItem(QrexParser& parser, ClassDef& def, bool isPrivate) {
   DealWithTextTo(parser, def, parser.current.text.begin);
   parser.Advance();
   for (const ClassKeyword& keyword : parser.Keywords().classLevel) {
@@ -26,7 +27,10 @@ void ParseItem(QrexParser& parser, ClassDef& def) {
     if (keyword.endsOn == EndsOn::LastToken) parser.Advance();
     return;
   }
+  const char* const begin = parser.current.text.begin;
+  const size_t methods = def.m_methods.size();
   ParseFieldOrMethod(parser, def);
+  if (def.m_methods.size() > methods) CheckTextOfMethod(parser, def, isPrivate, begin);
   parser.Advance();
 }
 
@@ -34,10 +38,11 @@ void ParseItem(QrexParser& parser, ClassDef& def) {
 
 void ParseClassBody(QrexParser& parser, ClassDef& def) {
   parser.Advance();
+  bool isPrivate = def.kind == ClassKind::Class && def.m_mixinBaseClass.empty();
   for (int64_t depth = 1;;) {
     if (parser.Is(kEndOfText)) parser.Fail("Met EOS before read matching brace");
     if (parser.Is(kDollar)) {
-      ParseItem(parser, def);
+      ParseItem(parser, def, isPrivate);
       continue;
     }
     if (parser.Is(kDollarDollar)) {  // the token behind it is not examined
@@ -50,6 +55,11 @@ void ParseClassBody(QrexParser& parser, ClassDef& def) {
     }
     if (parser.Is(kOpenBrace)) ++depth;
     if (parser.Is(kCloseBrace) && --depth == 0) return;
+    if (depth == 1 && parser.Is(kColon)) {
+      const TextRange word = parser.previous.text;
+      if (word == "public") isPrivate = false;
+      if (word == "private" || word == "protected") isPrivate = true;
+    }
     if (def.ExternalDefinition()) parser.DropTo(parser.current.text.end);
     parser.Advance();
   }

@@ -6,6 +6,7 @@
 #include "translator/class/class_emission.h"
 #include "translator/class/class_head.h"
 #include "translator/class/mixin_list.h"
+#include "translator/class/text_checks.h"
 #include "translator/emit/emit.h"
 #include "translator/emit/records.h"
 #include "translator/interface/interface_def.h"
@@ -246,6 +247,7 @@ void ClassStatement::Finish() {
   m_parser.Flush();
   m_parser.CheckReferences(*m_def);
   m_parser.CheckMetadata(*m_def);
+  CheckTextOfClass(m_parser, *m_def);
   m_parser.DropBehindCurrent();
 }
 

@@ -1,6 +1,7 @@
 #include "translator/interface/interface_parser.h"
 
 #include <algorithm>
+#include <set>
 
 #include "translator/interface/interface_def.h"
 #include "translator/interface/interface_emission.h"
@@ -124,6 +125,7 @@ class InterfaceStatement {
     ReadMembers();
     m_def->status = DeclStatus::Defined;
     WriteText();
+    if (m_parser.WantsCompilableText()) CheckTextOfMethods();
     m_parser.Advance();
     m_parser.RequireSemicolonAfter(*m_def);
     AddDelegatorMixin();
@@ -142,6 +144,7 @@ class InterfaceStatement {
   void ReadMembers();
   void CheckAttribute(const std::string& name, const TypeCode& type);
   void WriteText();
+  void CheckTextOfMethods() const;
   void AddDelegatorMixin();
   void RefuseNested(std::string_view modifier) {
     if (m_enclosing) m_parser.Fail("'" + std::string(modifier) + "' modifier not permitted on nested interface");
@@ -264,6 +267,35 @@ void InterfaceStatement::WriteText() {
   WriteInterfaceDeclarations(m_parser.out, *m_def);
   if (!m_def->m_nested) WriteTypeTraits(m_parser.out, *m_def);
   m_parser.Flush();
+}
+
+void InterfaceStatement::CheckTextOfMethods() const {
+  const std::string text = PrintedElement(*m_def);
+  std::set<std::string_view> names;
+  for (const FunctionSignature& method : m_def->m_methods) {
+    if (!names.insert(method.name).second) {
+      m_parser.WarnOfText("Methods of one name, " + method.name + ", in " + text +
+                              ", share an entry of the function table: give each a name of its own",
+                          *m_def);
+    }
+    for (const FunctionArg& argument : method.arguments) {
+      const NameSpaceElement* variant =
+          m_def->m_isIpc ? VariantWithoutDefault(argument.type, *m_def->owner.rootNameSpace) : nullptr;
+      if (!variant) continue;
+      m_parser.WarnOfText("Argument " + argument.name + " of " + method.name + " in " + text +
+                              " is read into no value of " + PrintedElement(*variant) +
+                              ": give that a default or a void item",
+                          *m_def);
+    }
+  }
+  if (!m_def->m_isIpc) return;
+  for (const InterfaceDef::FlatBase& flat : m_def->FlattenedBases()) {
+    const std::string& name = flat.base->GetQualifiedName();
+    if (flat.base->m_methods.empty() || name == "vesk::IObject" || name == "vesk::IPersistable") continue;
+    m_parser.WarnOfText("The stub of " + text + " has no methods of " + PrintedElement(*flat.base) +
+                            ": declare them in it, and leave the base out",
+                        *m_def);
+  }
 }
 
 // So that the mixin list of a class can name it.

@@ -25,6 +25,13 @@ class Dispatch {
         parser.Fail("Polymorphic argument " + argument.name + " is not a defined $variant");
       }
       m_levels.push_back({&argument, variant, 0});
+      for (const auto& item : variant->m_items) {
+        if (!item->isVoid) continue;
+        parser.WarnOfText("Polymorphic argument " + argument.name +
+                              " may be void, which no overload takes: give the item of " + PrintedElement(*variant) +
+                              " a struct without fields, { } name",
+                          def);
+      }
       leaves *= variant->m_items.size();
       if (leaves > kMaxLeaves || m_levels.size() > kMaxLevels)
         parser.Fail("Too many combinations of polymorphic arguments");

@@ -12,9 +12,18 @@ void ParseType(QrexParser& parser) {
   bool registered = parser.ParseExportModifier();
   bool reflected = registered;
   if (parser.Is(kShiftLeft)) parser.ParseQualifierFlags(reflected, registered, " >> on $type");
+  const char* const begin = parser.current.text.begin;
   const std::optional<ParsedType> parsed = parser.ParseTypeWithName(Naming::None, reflected);
   if (!parsed) parser.Fail("Type expected when read " + Printed(parser.current));
   const std::string type = TypeText(parsed->type);
+  const TypeView head = TypeView(parsed->type).WithoutMetadata();
+  if (head.IsNamed() && head.Op() != kOpTypedef && head.Op() != kOpCppText && parser.WantsCompilableText()) {
+    if (const NameSpaceElement* element = NamedElement(head, parser.Root())) {
+      parser.WarnOfText(
+          PrintedElement(*element) + " has a record of its own: leave $type out, and write + or <<reflect>> there",
+          *element, begin);
+    }
+  }
   const Project& project = parser.GetProject();
   const std::string api =
       registered && project.targetType == TargetType::DynamicLinkLibrary ? project.name + "_API " : std::string();

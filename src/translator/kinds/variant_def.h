@@ -36,6 +36,7 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
 
   bool HasSerialise() const;           // of its own
   bool CanSerialise() const override;  // as a type of items and fields
+  bool HasDefaultValue() const override { return m_hasDefault; }
   bool IsIObjectVisitable() const override;
   bool IsPrefVisitable() const override;
   bool ItemVisits(const VariantItem& item, bool (*test)(TypeView, NameSpace&)) const;

@@ -20,6 +20,7 @@ class VariantStatement {
   void ReadHeading();
   void ReadQualifiers();
   void ReadBody();
+  void CheckTextOfItems() const;
   void ReadDefault();
   void ReadItem();
   void ReadStruct(VariantItem& item);
@@ -149,6 +150,22 @@ void VariantStatement::ReadBody() {
   }
 }
 
+void VariantStatement::CheckTextOfItems() const {
+  if (!m_parser.WantsCompilableText() || !m_def->HasSerialise()) return;
+  for (const auto& item : m_def->m_items) {
+    std::vector<TypeView> types{item->type};
+    for (const ClassField& field : item->fields) types.push_back(field.type);
+    for (const TypeView type : types) {
+      const NameSpaceElement* variant = VariantWithoutDefault(type, *m_def->owner.rootNameSpace);
+      if (!variant) continue;
+      m_parser.WarnOfText("Item " + item->EffectiveName() + " of " + PrintedElement(*m_def) +
+                              " is read into no value of " + PrintedElement(*variant) +
+                              ": give that a default or a void item",
+                          *m_def);
+    }
+  }
+}
+
 void VariantStatement::Parse() {
   ReadHeading();
   if (m_parser.Is(kSemicolon)) {
@@ -168,6 +185,7 @@ void VariantStatement::Parse() {
   m_parser.Flush();
   m_parser.CheckReferences(*m_def);
   m_parser.CheckMetadata(*m_def);
+  CheckTextOfItems();
   m_parser.DropBehindCurrent();
 }
 

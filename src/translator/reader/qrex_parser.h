@@ -137,6 +137,9 @@ class QrexParser : public ExpressionParser {
   // Position: `address` in the expanded text, else the element's, else where the scanner reads.
   void ReportWarning(int code, std::string_view text, const NameSpaceElement* element = nullptr,
                      const char* address = nullptr);
+  // That the text of a declaration can't compile; says what to write instead. Only where text that compiles is wanted.
+  void WarnOfText(std::string_view text, const NameSpaceElement& element, const char* address = nullptr);
+  bool WantsCompilableText() const { return file.host.Settings().compilableText; }
   void CheckPublicHeader(const NameSpaceElement& element);       // both of the following
   void CheckNotExported(const NameSpaceElement& element);        // W1009
   void CheckNotInPublicHeader(const NameSpaceElement& element);  // W1008

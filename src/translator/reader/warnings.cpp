@@ -38,6 +38,10 @@ void QrexParser::ReportWarning(int code, std::string_view text, const NameSpaceE
   file.host.CountWarning();
 }
 
+void QrexParser::WarnOfText(std::string_view text, const NameSpaceElement& element, const char* address) {
+  if (WantsCompilableText()) ReportWarning(Warnings::kCannotCompile, text, &element, address);
+}
+
 void QrexParser::CheckPublicHeader(const NameSpaceElement& element) {
   CheckNotExported(element);
   CheckNotInPublicHeader(element);
@@ -96,7 +100,8 @@ void ParseWarning(QrexParser& parser) {
       parser.Expect(kColon, ":");
       do {
         const int64_t code = parser.ReadInt64();
-        if (!Warnings::IsCode(code)) parser.Fail("Invalid warning code : " + ToString(code));
+        if (!Warnings::IsCode(code, parser.WantsCompilableText()))
+          parser.Fail("Invalid warning code : " + ToString(code));
         parser.warnings.Set(static_cast<int>(code), on);
       } while (!parser.Is(kSemicolon) && !parser.Is(kCloseParen));
     } else {

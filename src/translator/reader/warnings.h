@@ -1,4 +1,4 @@
-// The warnings of the translator, W1000 to W1017: which of them are on.
+// The warnings of the translator: which of them are on.
 #pragma once
 
 #include <bitset>
@@ -9,8 +9,13 @@ namespace qrex {
 
 class Warnings {
  public:
-  static constexpr int kFirst = 1000, kLast = 1017;
-  static bool IsCode(int64_t code) { return code >= kFirst && code <= kLast; }
+  static constexpr int kFirst = 1000, kLast = 1019;
+  static constexpr int kCannotCompile = 1018;  // only with compilableText
+  static constexpr int kTwoModels = 1019;
+  // `$warning` knows the last two under compilableText alone.
+  static bool IsCode(int64_t code, bool compilableText) {
+    return code >= kFirst && code <= kLast && (code < kCannotCompile || compilableText);
+  }
 
   Warnings() { m_on.set(); }
   bool On(int code) const { return m_on[Index(code)]; }

@@ -152,6 +152,21 @@ int64_t DeclaredSize(Category category) {
 
 }  // namespace
 
+const NameSpaceElement* VariantWithoutDefault(TypeView decorated, NameSpace& root) {
+  const TypeView type = WithoutDecorators(decorated, root).type;
+  if (type.Op() == kOpVariant) {
+    const TypeBehaviour* variant = BehaviourOf(type, root);
+    return variant && !variant->HasDefaultValue() ? NamedElement(type, root) : nullptr;
+  }
+  constexpr TypeOp kHold[] = {kOpReference, kOpVector, kOpDeque,    kOpList, kOpSet,
+                              kOpBag,       kOpMap,    kOpDynArray, kOpArray};
+  if (std::find(std::begin(kHold), std::end(kHold), type.Op()) == std::end(kHold)) return nullptr;
+  if (type.Op() == kOpMap) {
+    if (const NameSpaceElement* key = VariantWithoutDefault(type.Key(), root)) return key;
+  }
+  return VariantWithoutDefault(type.Inner(), root);
+}
+
 int64_t SizeInBytes(TypeView decorated, NameSpace& root) {
   const TypeView type = WithoutDecorators(decorated, root).type;
   if (type.IsNamed()) return DeclaredSize(CategoryOf(type.Op()));

@@ -31,6 +31,8 @@ TypeView Resolved(TypeView type, NameSpace& root);
 NameSpaceElement* NamedElement(TypeView type, NameSpace& root);  // of a named type; null: it isn't declared
 
 bool IsSerialisable(TypeView type, NameSpace& root);
+// The first variant without a default value that a value of the type holds, also as an element; or null.
+const NameSpaceElement* VariantWithoutDefault(TypeView type, NameSpace& root);
 bool NeedsVisitObjects(TypeView type, NameSpace& root);
 bool NeedsVisitPrefs(TypeView type, NameSpace& root);
 void CollectNamedTypes(TypeView type, NameSpace& root, std::vector<const NameSpaceElement*>& out);  // appends
@@ -60,6 +62,7 @@ class TypeBehaviour {
  public:
   virtual ~TypeBehaviour() = default;
   virtual bool CanSerialise() const = 0;
+  virtual bool HasDefaultValue() const { return true; }  // a variant may have none
   virtual bool IsIObjectVisitable() const = 0;
   virtual bool IsPrefVisitable() const = 0;
 };

@@ -1,0 +1,74 @@
+#include "translator/class/text_checks.h"
+
+#include <algorithm>
+
+#include "translator/declared/class_def.h"
+#include "translator/reader/qrex_parser.h"
+
+namespace qrex {
+
+namespace {
+
+// Both models are `_model_` then, and that of the list hides the other one.
+void CheckModels(QrexParser& parser, const ClassDef& def) {
+  const auto hasModel = [](const ClassDef* mixin) { return mixin->IsPureModel() || mixin->m_inheritsModel; };
+  const auto& mixins = def.m_mixins;
+  const auto hiding = std::find_if(mixins.begin(), mixins.end(), hasModel);
+  if (hiding == mixins.end()) return;
+  if (def.m_inheritsModel) {
+    parser.ReportWarning(Warnings::kTwoModels,
+                         PrintedElement(def) + " archives and prints the model of " + PrintedElement(**hiding) +
+                             " in place of its own: write one model that has the fields of both",
+                         &def);
+  } else if (def.m_reflected && std::count_if(mixins.begin(), mixins.end(), hasModel) > 1) {
+    parser.WarnOfText(PrintedElement(def) + " lists several models: write one that has the fields of all", def);
+  }
+}
+
+void CheckModelField(QrexParser& parser, const ClassDef& def, const ModelField& field) {
+  if (field.m_name == "model") {
+    parser.WarnOfText("Model field " + field.m_name + " of " + PrintedElement(def) +
+                          " has the name of the function that gives the model: give it another one",
+                      def);
+  }
+  if (const NameSpaceElement* variant = VariantWithoutDefault(field.m_type, *def.owner.rootNameSpace)) {
+    parser.WarnOfText("Model field " + field.m_name + " of " + PrintedElement(def) + " begins with no value of " +
+                          PrintedElement(*variant) + ": give that a default or a void item",
+                      def);
+  }
+}
+
+}  // namespace
+
+void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
+  CheckModels(parser, def);
+  if (!parser.WantsCompilableText()) return;
+  for (const ModelField* field : def.m_modelFields) CheckModelField(parser, def, *field);
+  if (def.IsAdt() && def.IsTemplate() && !def.m_methods.empty()) {
+    parser.WarnOfText(PrintedElement(def) +
+                          " is a template with methods: write a $struct template, or an $adt of its own "
+                          "for each argument",
+                      def);
+  }
+}
+
+void CheckTextOfMethod(QrexParser& parser, const ClassDef& def, bool isPrivate, const char* position) {
+  const FunctionSignature& method = def.m_methods.back();
+  if (isPrivate) {
+    parser.WarnOfText("$ method " + method.name + " of " + PrintedElement(def) +
+                          " is called by a function outside of the class: write public: ahead of it, or leave $ out",
+                      def, position);
+  }
+  const bool needsTable = !method.arguments.empty() || !IsVoid(method.returnType);
+  const bool isOverload =
+      std::any_of(def.m_methods.begin(), def.m_methods.end() - 1, [&](const FunctionSignature& other) {
+        return other.name == method.name && (needsTable || !other.arguments.empty() || !IsVoid(other.returnType));
+      });
+  if (def.m_reflected && isOverload) {
+    parser.WarnOfText("$ methods of one name, " + method.name + ", in " + PrintedElement(def) +
+                          ", share the tables of their record: give each a name of its own, or leave $ out",
+                      def, position);
+  }
+}
+
+}  // namespace qrex

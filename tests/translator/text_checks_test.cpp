@@ -1,0 +1,90 @@
+// Declarations whose text can't compile, or loses something.
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+class TextChecksTest : public TranslateTest {
+ protected:
+  // What is printed beside the W1002 of things that nobody registers.
+  void AssertWarned(const std::string& text, const std::string& warning) {
+    AssertMessages({{"$warning(disable: 1002 1007)\n" + text, warning}});
+  }
+};
+
+TEST_F(TextChecksTest, OneWarningForEach) {
+  settings.compilableText = true;
+  const std::pair<std::string, std::string> cases[] = {
+      {"$interface I\n{\n    void F();\n    int32 F(int32 a);\n};",
+       "2) : warning W1018 : Methods of one name, F, in $interface I, share an entry of the function table: give each "
+       "a name of its own"},
+      {"$struct+ S\n{\n    $void F() {}\n    $void F(int32 a) {}\n};",
+       "5) : warning W1018 : $ methods of one name, F, in $struct+ S, share the tables of their record: give each a "
+       "name of its own, or leave $ out"},
+      {"$struct S\n{\n    $void F() {}\n    $int32 F(int32 a) { return a; }\n};", ""},
+      {"$struct+ S\n{\n    $void F() {}\n    $void F() const {}\n};", ""},
+      {"$class K\n{\n    $void F() {}\npublic:\n    $void G() {}\n    struct X { private: int a; };\n    $void H() "
+       "{}\n};",
+       "4) : warning W1018 : $ method F of $class K is called by a function outside of the class: write public: ahead "
+       "of it, or leave $ out"},
+      {"$class K isa vesk::IObject { $void F() {} };", ""},
+      {"$struct S { private: $int32 a; protected: $void F() {} };",
+       "2) : warning W1018 : $ method F of $struct S is called by a function outside of the class: write public: ahead "
+       "of it, or leave $ out"},
+      {"$adt A<typename T> { void F(); };",
+       "2) : warning W1018 : $adt A is a template with methods: write a $struct template, or an $adt of its own for "
+       "each argument"},
+      {"$adt A<typename T> { };\n$adt B { void F(); };", ""},
+      {"$interface B { void F(); };\n$interface rmi R : B { void G(); };",
+       "3) : warning W1018 : The stub of $interface R has no methods of $interface B: declare them in it, and leave "
+       "the base out"},
+      {"$interface B { };\n$interface rmi R : B { void G(); };\n$interface I : B { void G(); };", ""},
+      {"$enum E { a };\n$type E;",
+       "3) : warning W1018 : $enum E has a record of its own: leave $type out, and write + or <<reflect>> there"},
+      {"$type std::vector<int>;\n$typedef+ xvector<int32> Numbers;\n$type Numbers;", ""},
+      {"$variant V { int32; };\n$model M { xmap<int32,V> v; };",
+       "3) : warning W1018 : Model field v of $model M begins with no value of $variant V: give that a default or a "
+       "void item"},
+      {"$variant V { int32; };\n$variant W <<-ar>> { V; };", ""},
+      {"$variant V { int32; };\n$variant W { int32; { V v; } item; };",
+       "3) : warning W1018 : Item item of $variant W is read into no value of $variant V: give that a default or a "
+       "void item"},
+      {"$variant V { int32; };\n$interface rmi R { void F([in] const V& v); };",
+       "3) : warning W1018 : Argument v of F in $interface R is read into no value of $variant V: give that a default "
+       "or a void item"},
+      {"$variant V { void; int32; };\n$variant D { default 1; int32; };\n$model M { V v; D d; };", ""},
+      {"$struct S : model { int32 model; } { };",
+       "2) : warning W1018 : Model field model of $struct S has the name of the function that gives the model: give it "
+       "another one"},
+      {"$variant V { void none; int32; };\n$polymorphic void F([V v]);",
+       "3) : warning W1018 : Polymorphic argument v may be void, which no overload takes: give the item of $variant V "
+       "a struct without fields, { } name"},
+      {"$model A { int32 a; };\n$model B { int32 b; };\n$struct S <<reflect>> : mixin [ A B ] { };",
+       "4) : warning W1018 : $struct S lists several models: write one that has the fields of all"},
+  };
+  for (const auto& [text, warning] : cases) {
+    AssertWarned(text, warning.empty() ? "" : "t.h(" + warning + "\n");
+  }
+  settings.compilableText = false;
+  for (const auto& [text, warning] : cases) AssertWarned(text, "");
+}
+
+TEST_F(TextChecksTest, AModelThatHidesAnother) {
+  const std::string models = "$mixin M : model { int32 a; } { };\n$model Own { int32 b; };\n";
+  const std::string warning =
+      "t.h(4) : warning W1019 : $struct S archives and prints the model of $mixin M in place of its own: write one "
+      "model that has the fields of both\n";
+  AssertWarned(models + "$struct S : model Own mixin [ M ] { };", warning);
+  AssertWarned(models + "$struct S : model { int32 c; } mixin [ M ] { };", warning);
+  AssertWarned(models + "$struct S : mixin [ M ] { };", "");
+}
+
+TEST_F(TextChecksTest, NumbersOfTheKey) {
+  const std::string text = "$warning(disable: 1018 1019)\n$class K { $void F() {} };";
+  EXPECT_EQ(ErrorOf("t.h", text), "t.h(1) : error : Invalid warning code : 1018");
+  settings.compilableText = true;
+  AssertWarned(text, "");
+}
+
+}  // namespace
+}  // namespace qrex
