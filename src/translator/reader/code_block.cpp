@@ -134,7 +134,7 @@ std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::st
     if (!code.TakeItem()) parser.Advance();
     end = parser.previous.text.end;
   }
-  return name + " = " + code.TextTo(end);
+  return name + " = " + code.TextTo(end) + (parser.WantsCompilableText() ? ";" : "");
 }
 
 std::string_view PassingSuffix(TypeView type) {

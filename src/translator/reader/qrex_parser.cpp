@@ -61,6 +61,12 @@ QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWr
 void QrexParser::CopyTo(const char* position) {
   out.Flush();
   if (position < m_copyPosition) return;  // dealt with before
+  for (const TextRange& range : m_uncopied) {
+    if (range.begin < m_copyPosition || range.end > position) continue;
+    stream.CopyRange(m_copyPosition, range.begin);
+    m_copyPosition = range.end;
+  }
+  std::erase_if(m_uncopied, [&](const TextRange& range) { return range.end <= position; });
   stream.CopyRange(m_copyPosition, position);
   m_copyPosition = position;
 }

@@ -130,7 +130,8 @@ class QrexParser : public ExpressionParser {
   std::string ReadArgumentText();            // behind the current token, to the top-level `,` or `)` that ends it
   void ParseMetadataList(std::string& out);  // `[` is current; behind `]` afterwards
   void ParseMetadataValue(std::string& out);
-  void ParseOptionalMetadata(std::string& out);  // tests for `[`
+  // The same, where the type or signature may be copied: text that compiles leaves `: [...]` out.
+  void ParseMetadataBehindColon(std::string& out);
 
   // --- Warnings
   bool WarningOn(int code) const { return warnings.On(code); }
@@ -191,6 +192,7 @@ class QrexParser : public ExpressionParser {
 
   const KeywordTables& m_keywords;
   const char* m_copyPosition;
+  std::vector<TextRange> m_uncopied;     // what is left out of the text that is copied next, in its order
   std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
   struct OuterDepth {
     int64_t braces;

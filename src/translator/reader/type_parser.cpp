@@ -142,7 +142,7 @@ std::optional<TypeCode> QrexParser::ParseSuffixedType(bool reflected) {
       PrependOp(*type, kOpConst);
     } else if (Accept(kColon)) {
       std::string metadata;
-      ParseMetadataList(metadata);
+      ParseMetadataBehindColon(metadata);
       type->insert(0, metadata);
     } else {
       return type;
@@ -169,7 +169,7 @@ std::optional<ParsedType> QrexParser::ParseTypeWithName(Naming naming, bool refl
   while (Is(kOpenBracket) || Is(kColon)) {
     if (Accept(kColon)) {
       std::string metadata;
-      ParseMetadataList(metadata);
+      ParseMetadataBehindColon(metadata);
       dimension.insert(0, metadata);
       continue;
     }
@@ -298,7 +298,7 @@ void QrexParser::ParseSignatureEnd(FunctionSignature& signature, const Signature
     signature.isConst = true;
     Advance();
   }
-  if (Accept(kColon)) ParseOptionalMetadata(signature.metadata);
+  if (Accept(kColon) && Is(kOpenBracket)) ParseMetadataBehindColon(signature.metadata);
 }
 
 FunctionSignature QrexParser::ParseFunctionSignature(const SignatureRules& rules) {
@@ -359,8 +359,10 @@ void QrexParser::ParseMetadataList(std::string& out) {
   AppendMetadataList(out, count, values);
 }
 
-void QrexParser::ParseOptionalMetadata(std::string& out) {
-  if (Is(kOpenBracket)) ParseMetadataList(out);
+void QrexParser::ParseMetadataBehindColon(std::string& out) {
+  const char* const colon = previous.text.begin;
+  ParseMetadataList(out);
+  if (WantsCompilableText()) m_uncopied.push_back(TextRange(colon, previous.text.end));
 }
 
 void QrexParser::ParseMetadataValue(std::string& out) {
