@@ -17,21 +17,23 @@ void WriteTail(ScannedFile& file, TextWriter& out, RegistrationLists& lists) {
   lists.unregisterNames.insert(lists.unregisterNames.end(), file.unregisterNames.begin(), file.unregisterNames.end());
 }
 
-// "a::b::N" as its name spaces and its last part.
-std::vector<std::string_view> PathParts(std::string_view qualifiedName) {
-  std::vector<std::string_view> parts;
+// "a::b::N" taken apart.
+struct QualifiedName {
+  std::vector<std::string_view> nameSpaces;
+  std::string_view name;
+};
+QualifiedName PartsOf(std::string_view qualifiedName) {
+  QualifiedName parts;
   for (size_t colons; (colons = qualifiedName.find("::")) != std::string_view::npos;
        qualifiedName.remove_prefix(colons + 2)) {
-    parts.push_back(qualifiedName.substr(0, colons));
+    parts.nameSpaces.push_back(qualifiedName.substr(0, colons));
   }
-  parts.push_back(qualifiedName);
+  parts.name = qualifiedName;
   return parts;
 }
 
 void WriteRegistrarDeclaration(TextWriter& out, std::string_view keyword, std::string_view qualifiedName) {
-  std::vector<std::string_view> nameSpaces = PathParts(qualifiedName);
-  const std::string_view name = nameSpaces.back();
-  nameSpaces.pop_back();
+  const auto [nameSpaces, name] = PartsOf(qualifiedName);
   Write(out, "$open$void _$keyword$_$name$(); $close$\n",
         "open"_ = Each(out, nameSpaces, "", [&](std::string_view part) { out << "namespace " << part << " { "; }),
         "keyword"_ = keyword, "name"_ = name,
@@ -39,9 +41,7 @@ void WriteRegistrarDeclaration(TextWriter& out, std::string_view keyword, std::s
 }
 
 void WriteRegistrarCall(TextWriter& out, std::string_view keyword, std::string_view qualifiedName) {
-  std::vector<std::string_view> nameSpaces = PathParts(qualifiedName);
-  const std::string_view name = nameSpaces.back();
-  nameSpaces.pop_back();
+  const auto [nameSpaces, name] = PartsOf(qualifiedName);
   Write(out, "$scope$_$keyword$_$name$();\n",
         "scope"_ = Each(out, nameSpaces, "", [&](std::string_view part) { out << part << "::"; }), "keyword"_ = keyword,
         "name"_ = name);
