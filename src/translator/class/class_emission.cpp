@@ -309,7 +309,8 @@ std::vector<const InterfaceDef*> AllInterfaces(const ClassDef& def) {
 }
 
 void WriteForwardDeclaration(TextWriter& out, const ClassDef& def) {
-  out << def.TemplatePrefix() << def.StructWord() << def.name << ";\n";
+  Write(out, "$prefix$$struct$$class$;\n", "prefix"_ = def.TemplatePrefix(), "struct"_ = def.StructWord(),
+        "class"_ = def.name);
 }
 
 void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def) {

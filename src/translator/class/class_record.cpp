@@ -112,13 +112,13 @@ void ClassRecord::WriteMapOrSetFunctions(const ModelField& field) {
       Write(m_out, "{&vesk::IXMap::Stubs<$type$ >::GetTable()},\n", "type"_ = type);
     }
   };
-  m_out << "static const vesk::PtrMapOrSetFns " << m_name << "_" << field.m_name << "_mapOrSetfns[] = \n";
   Write(m_out, R"(
+    static const vesk::PtrMapOrSetFns $class$_$field$_mapOrSetfns[] =$blank$
     {
         $rows$
     };
   )",
-        "rows"_ = rows);
+        "class"_ = m_name, "field"_ = field.m_name, "blank"_ = ' ', "rows"_ = rows);
 }
 
 void ClassRecord::WriteModelFields() {
@@ -204,7 +204,8 @@ void ClassRecord::WriteRecord() {
     if (m_def.m_interfaces.empty()) {
       m_out << "0,0,0";
     } else {
-      m_out << m_name << "_interfaces," << m_flattened.size() << "," << m_def.m_interfaces.size();
+      Write(m_out, "$class$_interfaces,$flattened$,$direct$", "class"_ = m_name, "flattened"_ = m_flattened.size(),
+            "direct"_ = m_def.m_interfaces.size());
     }
   };
   Write(

@@ -15,8 +15,10 @@ namespace {
 
 // The parameters of the function in a table that stands for a method.
 void WriteTableParameters(TextWriter& out, const FunctionSignature& method) {
-  out << "void" << (method.isConst ? " const" : "") << "* _self" << (method.arguments.empty() ? "" : ",");
-  WriteArgDeclarations(out, method.arguments);
+  Write(
+      out, "void$const$* _self$comma$$arguments$", "const"_ = If(method.isConst, " const"),
+      "comma"_ = If(!method.arguments.empty(), ","),
+      "arguments"_ = [&] { WriteArgDeclarations(out, method.arguments); });
 }
 
 void WriteTableSlot(TextWriter& out, const FunctionSignature& method) {

@@ -172,13 +172,10 @@ void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
   auto argument = [&](const FunctionArg& arg) {
     m_out << arg.name << (arg.direction == ArgDirection::Copy ? ".release()" : "");
   };
-  auto results = [&] {
-    m_out << "Push()";
-    for (const FunctionArg& arg : method.arguments) {
-      if (ComesBack(arg)) m_out << " << " << arg.name;
-    }
-    m_out << ";\n";
+  auto result = [&](const FunctionArg& arg) {
+    if (ComesBack(arg)) m_out << " << " << arg.name;
   };
+  auto results = [&] { Write(m_out, "Push()$results$;\n", "results"_ = Each(m_out, method.arguments, "", result)); };
   Write(
       m_out, R"(
     void Thunk$index$()
