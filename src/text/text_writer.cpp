@@ -4,6 +4,7 @@
 #include <charconv>
 #include <ostream>
 #include <streambuf>
+#include <utility>
 
 #include "text/exceptions.h"
 #include "text/stream_adapters.h"
@@ -39,6 +40,7 @@ class IndentingOutputStreamAsStreambuf : public std::streambuf {
   }
 
   int64_t indent = 0;
+  bool atLineStart = true;
 
  protected:
   int overflow(int c) override {
@@ -61,17 +63,16 @@ class IndentingOutputStreamAsStreambuf : public std::streambuf {
     if (indent < 1) return m_target.Write(text.data(), text.size());
     const std::string blanks(static_cast<size_t>(indent), ' ');
     while (!text.empty()) {
-      if (m_atLineStart) m_target.Write(blanks.data(), blanks.size());
+      if (atLineStart) m_target.Write(blanks.data(), blanks.size());
       const size_t lineFeed = text.find('\n');
-      m_atLineStart = lineFeed != std::string_view::npos;
-      const size_t length = m_atLineStart ? lineFeed + 1 : text.size();
+      atLineStart = lineFeed != std::string_view::npos;
+      const size_t length = atLineStart ? lineFeed + 1 : text.size();
       m_target.Write(text.data(), length);
       text.remove_prefix(length);
     }
   }
 
   IOutputStream& m_target;
-  bool m_atLineStart = true;
   char m_array[4096];
 };
 
@@ -125,6 +126,7 @@ void TextWriter::EndLine() {
 
 int64_t TextWriter::Indent() const { return m_stream->buffer.indent; }
 void TextWriter::AddIndent(int64_t columns) { m_stream->buffer.indent += columns; }
+bool TextWriter::SetAtLineStart(bool value) { return std::exchange(m_stream->buffer.atLineStart, value); }
 
 struct MemoryTextTarget {
   PagedBuffer buffer;

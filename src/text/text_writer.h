@@ -40,6 +40,7 @@ class TextWriter {
   void EndLine();  // a line feed, then a flush
   int64_t Indent() const;
   void AddIndent(int64_t columns);  // flush first: text already in the array takes the new amount (IndentScope does)
+  bool SetAtLineStart(bool value);  // flush first; the answer is what held before
 
  private:
   TextWriter& WriteSigned(int64_t value);
@@ -83,6 +84,29 @@ class IndentScope {
  private:
   TextWriter& m_writer;
   int64_t m_columns;
+};
+
+// An IndentScope that opens within a line: the further lines are indented, what is left of this one isn't.
+class LineRestScope {
+ public:
+  LineRestScope(TextWriter& writer, int64_t columns) : m_writer(writer), m_columns(columns) {
+    m_writer.Flush();
+    m_writer.AddIndent(columns);
+    m_wasAtLineStart = m_writer.SetAtLineStart(false);
+  }
+  ~LineRestScope() {
+    m_writer.Flush();
+    m_writer.AddIndent(-m_columns);
+    // Without indentation the writer doesn't follow the line starts: the next scope opens at one.
+    if (m_writer.Indent() < 1) m_writer.SetAtLineStart(m_wasAtLineStart);
+  }
+  LineRestScope(const LineRestScope&) = delete;
+  LineRestScope& operator=(const LineRestScope&) = delete;
+
+ private:
+  TextWriter& m_writer;
+  int64_t m_columns;
+  bool m_wasAtLineStart;
 };
 
 }  // namespace qrex

@@ -51,5 +51,46 @@ TEST(WriteTest, LinesAndMargins) {
             "}\n");
 }
 
+TEST(WriteTest, UnderConditions) {
+  const auto text = Emitted([](TextWriter& out) {
+    const auto line = [&] { out << "line\n"; };
+    const std::string word = "word";
+    Write(out, R"(
+
+      f($no$$yes$);
+          $noLine$
+          $yesLine$
+          $noText$
+          $yesText$
+    )",
+          "no"_ = If(false, word), "yes"_ = If(true, word), "noLine"_ = If(false, line), "yesLine"_ = If(true, line),
+          "noText"_ = If(false, "text"), "yesText"_ = If(true, "text"));
+  });
+  EXPECT_EQ(text, "\nf(word);\n    line\n    text\n");
+}
+
+TEST(WriteTest, FurtherLinesWithinALine) {
+  const auto text = Emitted([](TextWriter& out) {
+    const auto twoLines = [&] { out << "map<int,\nint>"; };
+    Write(out, R"(
+      {
+          f($first$) { g($second$); }
+      }
+    )",
+          "first"_ = twoLines, "second"_ = "h(),\nk()");
+    const Block block(out);
+    out << "int a;\n";
+  });
+  EXPECT_EQ(text,
+            "{\n"
+            "    f(map<int,\n"
+            "    int>) { g(h(),\n"
+            "    k()); }\n"
+            "}\n"
+            "{\n"
+            "    int a;\n"
+            "}\n");
+}
+
 }  // namespace
 }  // namespace qrex

@@ -2,6 +2,7 @@
 
 #include "text/numbers.h"
 #include "translator/class/class_members.h"
+#include "translator/class/node_text.h"
 #include "translator/emit/emit.h"
 #include "translator/reader/code_block.h"
 #include "translator/reader/qrex_parser.h"
@@ -26,10 +27,10 @@ class CachedFunction {
     m_parser.DropToCurrent();
     if (m_parser.AcceptWord("with")) ReadInput();
     WriteCalculation();
-    if (m_signature.arguments.empty()) {
-      WritePlain();
-    } else {
+    if (IsKeyed()) {
       WriteKeyed();
+    } else {
+      WritePlain();
     }
     m_parser.Flush();
   }
@@ -42,22 +43,24 @@ class CachedFunction {
   void WriteCalculation();
   void WritePlain();
   void WriteKeyed();
-  void WriteNodeMembers(const std::string& keyArguments);
-  void WriteRecalc(const std::string& keyArguments);
+  void WriteBase();
   void WriteQueueIndex();
-  std::string BaseText(std::string_view keyed, const std::string& keyType) const;
-  void WriteKeyedName();
+  void WritePairKey();
+  void WriteCalculations();
+  void WriteSyncCalculation();
+  void WriteAsyncCalculations();
+  void WriteCalcInput();
   void WriteFinalSelf(std::string_view self);
+  void WriteNameParts();
   void WriteAccessor(const std::string& value);
 
-  std::string Node() const { return "_depnode_" + m_written.name; }
-  std::string Calc() const { return "_calc_" + m_written.name; }
   bool HasInput() const { return !m_inputName.empty(); }
-  std::string KeyType() const { return KeyTypeFrom(0); }
+  bool IsKeyed() const { return !m_signature.arguments.empty(); }
+  bool HasPairKey() const { return m_signature.arguments.size() > 1; }
   std::string KeyTypeFrom(size_t first) const;
   std::string KeyExpression(size_t first) const;
   std::string KeyPart(size_t index, const std::string& last = ".first") const;
-  std::string KeyArguments() const;
+  std::string Arguments(std::string_view key, std::string_view input) const;
 
   QrexParser& m_parser;
   TextWriter& m_out;
@@ -65,6 +68,9 @@ class CachedFunction {
   FunctionSignature m_written;    // as declared
   FunctionSignature m_signature;  // returns the output
   std::string m_output;           // its type's text
+  std::string m_calc;             // the function that calculates
+  std::string m_keyType;          // of the keyed form, as are the key's parts as arguments
+  std::string m_keyArguments;
   NodeHead m_head;
   bool m_byReference = false, m_async = false, m_asyncIo = false;
   int64_t m_queue = 0;
@@ -114,7 +120,11 @@ void CachedFunction::Normalise() {
     m_signature.arguments.erase(m_signature.arguments.begin());
   }
   m_output = TypeText(m_signature.returnType);
+  m_calc = "_calc_" + m_written.name;
   if (m_signature.arguments.size() > kMaxKeys) m_parser.Fail("Too many parameters on $cache function");
+  if (!IsKeyed()) return;
+  m_keyType = KeyTypeFrom(0);
+  for (size_t i = 0; i < m_signature.arguments.size(); ++i) m_keyArguments += (i > 0 ? "," : "") + KeyPart(i);
 }
 
 void CachedFunction::ReadInput() {
@@ -123,17 +133,23 @@ void CachedFunction::ReadInput() {
   if (!input || input->name.empty() || input->followedByParen) m_parser.Fail("Error parsing input type and name");
   m_inputType = std::move(input->type);
   m_inputName = std::move(input->name);
-  m_out << "void " << Calc() << "_input(";
-  PrintDeclaration(m_out, m_inputType, m_inputName, DeclarationMode::Reference);
-  if (!m_signature.arguments.empty()) m_out << ",";
-  WriteArgDeclarations(m_out, m_signature.arguments);
-  m_out << ") const\n";
+  auto parameters = [&] {
+    if (IsKeyed()) m_out << ",";
+    WriteArgDeclarations(m_out, m_signature.arguments);
+  };
+  Write(m_out, "void $calc$_input($type$& $name$$parameters$) const\n", "calc"_ = m_calc,
+        "type"_ = TypeView(m_inputType), "name"_ = m_inputName, "parameters"_ = parameters);
   if (m_parser.Accept(kAssign)) {
     const std::string body = ReadShortBody(m_parser, m_def, m_inputName);
     m_parser.Advance();
     m_parser.DropToCurrent();
-    Block block(m_out);
-    m_out << body << "\n";
+    Write(
+        m_out, R"(
+      {
+          $body$
+      }
+    )",
+        "body"_ = [&] { m_out << body << "\n"; });
   } else {
     m_out << "\n";
     CopyCodeBlock(m_parser, m_def);
@@ -143,7 +159,7 @@ void CachedFunction::ReadInput() {
 
 void CachedFunction::WriteCalculation() {
   FunctionSignature calculation = m_written;
-  calculation.name = Calc();
+  calculation.name = m_calc;
   if (HasInput()) {
     FunctionArg input;
     input.type = m_inputType;
@@ -178,74 +194,152 @@ std::string CachedFunction::KeyPart(size_t index, const std::string& last) const
   return index + 1 < m_signature.arguments.size() ? part + last : part;
 }
 
-std::string CachedFunction::KeyArguments() const {
+// What is handed to the calculation: the output, when it is a reference, the key's parts, the input.
+std::string CachedFunction::Arguments(std::string_view key, std::string_view input) const {
   std::string arguments;
-  for (size_t i = 0; i < m_signature.arguments.size(); ++i) arguments += (i > 0 ? "," : "") + KeyPart(i);
+  for (std::string_view argument : {If(m_byReference, "_output"), key, input}) {
+    if (!arguments.empty() && !argument.empty()) arguments += ",";
+    arguments += argument;
+  }
   return arguments;
 }
 
 // --- Nodes
 
-std::string CachedFunction::BaseText(std::string_view keyed, const std::string& keyType) const {
+void CachedFunction::WritePlain() {
+  Write(
+      m_out, R"~(
+    struct _depnode_$name$ : public $base$
+    {
+        typedef $base$ base;
+        using typename base::output_type;
+        $calculations$
+        $class$ const* _GetSelf() const { return CONST_ATTRIB_CAST($class$,_dn_$name$); }
+        $finalSelf$
+        virtual vesk::xstring Name() const { return "$class$::$name$()"; }
+        $queueIndex$
+    } _dn_$name$;
+  )~",
+      "name"_ = m_written.name, "class"_ = m_def.name, "base"_ = [&] { WriteBase(); },
+      "calculations"_ = [&] { WriteCalculations(); }, "finalSelf"_ = [&] { WriteFinalSelf("_GetSelf()"); },
+      "queueIndex"_ = [&] { WriteQueueIndex(); });
+  WriteAccessor("_dn_" + m_written.name + ".read()");
+  m_def.m_evictionMembers.push_back("_dn_" + m_written.name);
+}
+
+void CachedFunction::WriteKeyed() {
+  Write(
+      m_out, R"(
+    struct _depnode_$name$ : public $base$
+    {
+        typedef $base$ base;
+        using typename base::key_type;
+        using typename base::output_type;
+        using typename base::map_type;
+        $calculations$
+        virtual vesk::xstring Name() const
+        {
+            $pairKey$
+            return vxMakeString("$class$::$name$("$parts$ << ')');
+        }
+        $queueIndex$
+        map_type& _GetMap() const { return _self->_map_$name$; }
+        $finalSelf$
+    };
+    mutable typename _depnode_$name$::map_type _map_$name$;
+  )",
+      "name"_ = m_written.name, "class"_ = m_def.name, "base"_ = [&] { WriteBase(); },
+      "calculations"_ = [&] { WriteCalculations(); }, "pairKey"_ = [&] { WritePairKey(); },
+      "parts"_ = [&] { WriteNameParts(); }, "queueIndex"_ = [&] { WriteQueueIndex(); },
+      "finalSelf"_ = [&] { WriteFinalSelf("_self"); });
+  WriteAccessor("_map_" + m_written.name + "[" + KeyExpression(0) + "].read(this)");
+  m_def.m_evictionMembers.push_back("_map_" + m_written.name);
+}
+
+void CachedFunction::WriteBase() {
   const std::string_view kind = !m_async ? "SyncDepNode" : HasInput() ? "AsyncNodeOnInput" : "AsyncIndepNode";
-  return "vesk::DG" + std::string(keyed) + std::string(kind) + "<" + Node() + "," + m_def.name + "," +
-         (keyType.empty() ? "" : keyType + ",") + (m_async && HasInput() ? TypeText(m_inputType) + "," : "") +
-         m_output + ">";
-}
-
-void CachedFunction::WriteRecalc(const std::string& keyArguments) {
-  const bool isKeyed = !keyArguments.empty();
-  const bool hasPairKey = m_signature.arguments.size() > 1;
-  if (m_head.hard) m_out << Node() << "() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }\n";
-  m_out << "virtual bool RecalcCache() const\n";
-  Block body(m_out);
-  if (!m_head.hard) m_out << (isKeyed ? "auto" : m_output) << " _prev = _output;\n";
-  if (hasPairKey) m_out << KeyType() << " const& _key = _GetKey();\n";
-  const std::string key = !isKeyed ? "" : hasPairKey ? keyArguments : "_GetKey()";
-  const std::string self = isKeyed ? "_self->" : "_GetSelf()->";
-  if (m_byReference) {
-    m_out << self << Calc() << "(_output" << (isKeyed ? "," : "") << key << ");\n";
-  } else {
-    m_out << "_output = " << self << Calc() << "(" << key << ");\n";
-  }
-  m_out << "if (vesk::TypeHasAdditionalSize<output_type>()) UpdateByteSize();\n";
-  m_out << (m_head.hard ? "return true;\n" : "return _prev != _output;\n");
-}
-
-void CachedFunction::WriteNodeMembers(const std::string& keyArguments) {
-  if (!m_async) return WriteRecalc(keyArguments);
-  const bool isKeyed = !keyArguments.empty();
-  const std::string_view key = isKeyed ? ", const key_type& _key" : "";
-  if (HasInput()) m_out << "using typename base::input_type;\n";
-  if (m_asyncIo) m_out << Node() << "() { SetFlag(vesk::DF_ASYNC_IO); }\n";
-  m_out << "static void CalcOutput(const " << m_def.name << "* _self, output_type& _output" << key
-        << (HasInput() ? ", const input_type& _input)\n" : ")\n");
-  std::string arguments = m_byReference ? "_output" : "";
-  for (const std::string& more : {keyArguments, std::string(HasInput() ? "_input" : "")}) {
-    if (!more.empty()) arguments += (arguments.empty() ? "" : ",") + more;
-  }
-  {
-    Block body(m_out);
-    m_out << (m_byReference ? "" : "_output = ") << "_self->" << Calc() << "(" << arguments << ");\n";
-  }
-  if (!HasInput()) return;
-  m_out << "static void CalcInput(const " << m_def.name << "* _self, input_type& _input" << key << ")\n";
-  Block body(m_out);
-  m_out << "_self->" << Calc() << "_input(_input" << (isKeyed ? "," : "") << keyArguments << ");\n";
+  auto inputType = [&] { Write(m_out, "$type$,", "type"_ = TypeView(m_inputType)); };
+  Write(m_out, "vesk::DG$keyed$$kind$<_depnode_$name$,$class$,$keyType$$comma$$inputType$$output$>",
+        "keyed"_ = If(IsKeyed(), "Keyed"), "kind"_ = kind, "name"_ = m_written.name, "class"_ = m_def.name,
+        "keyType"_ = m_keyType, "comma"_ = If(IsKeyed(), ","), "inputType"_ = If(HasInput(), inputType),
+        "output"_ = m_output);
 }
 
 void CachedFunction::WriteQueueIndex() {
-  if (m_queue != 0) m_out << "virtual vesk::ssize_t EvictionQueueIndex() const { return " << m_queue << "; }\n";
+  if (m_queue == 0) return;
+  Write(m_out, "virtual vesk::ssize_t EvictionQueueIndex() const { return $queue$; }\n", "queue"_ = m_queue);
+}
+
+// Both forms begin the functions that need the parts of a pair by asking for it.
+void CachedFunction::WritePairKey() {
+  if (HasPairKey()) Write(m_out, "$type$ const& _key = _GetKey();\n", "type"_ = m_keyType);
+}
+
+void CachedFunction::WriteCalculations() {
+  if (!m_async) {
+    WriteSyncCalculation();
+  } else {
+    WriteAsyncCalculations();
+  }
+}
+
+void CachedFunction::WriteSyncCalculation() {
+  const std::string_view key = HasPairKey() ? m_keyArguments : If(IsKeyed(), "_GetKey()");
+  if (m_head.hard) {
+    Write(m_out, "_depnode_$name$() { SetFlag(vesk::DF_PROPAGATE_HARD_DIRTINESS); }\n", "name"_ = m_written.name);
+  }
+  const std::string_view previousType = m_head.hard ? "" : IsKeyed() ? "auto" : std::string_view(m_output);
+  WriteRecalcCache(m_out, {"_output", "output_type", previousType}, "", [&] {
+    WritePairKey();
+    Write(m_out, "$assign$$self$->$calc$($arguments$);\n", "assign"_ = If(!m_byReference, "_output = "),
+          "self"_ = IsKeyed() ? "_self" : "_GetSelf()", "calc"_ = m_calc, "arguments"_ = Arguments(key, ""));
+  });
+}
+
+// The calculation may run on another thread: it sees the object, the key and the input, not the node.
+void CachedFunction::WriteAsyncCalculations() {
+  auto flag = [&] { Write(m_out, "_depnode_$name$() { SetFlag(vesk::DF_ASYNC_IO); }\n", "name"_ = m_written.name); };
+  Write(m_out, R"(
+    $inputType$
+    $constructor$
+    static void CalcOutput(const $class$* _self, output_type& _output$key$$input$)
+    {
+        $assign$_self->$calc$($arguments$);
+    }
+    $calcInput$
+  )",
+        "inputType"_ = If(HasInput(), "using typename base::input_type;"), "constructor"_ = If(m_asyncIo, flag),
+        "class"_ = m_def.name, "key"_ = If(IsKeyed(), ", const key_type& _key"),
+        "input"_ = If(HasInput(), ", const input_type& _input"), "assign"_ = If(!m_byReference, "_output = "),
+        "calc"_ = m_calc, "arguments"_ = Arguments(m_keyArguments, If(HasInput(), "_input")),
+        "calcInput"_ = If(HasInput(), [&] { WriteCalcInput(); }));
+}
+
+void CachedFunction::WriteCalcInput() {
+  Write(m_out, R"(
+    static void CalcInput(const $class$* _self, input_type& _input$key$)
+    {
+        _self->$calc$_input(_input$comma$$keyArguments$);
+    }
+  )",
+        "class"_ = m_def.name, "key"_ = If(IsKeyed(), ", const key_type& _key"), "calc"_ = m_calc,
+        "comma"_ = If(IsKeyed(), ","), "keyArguments"_ = m_keyArguments);
 }
 
 void CachedFunction::WriteFinalSelf(std::string_view self) {
   if (m_def.IsMixin()) {
-    WriteText(m_out,
-              "const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename "
-              "BC::FinalClass*>($0); }\n",
-              {self});
-  } else {
-    WriteText(m_out, "$0 const* _GetFinalSelf() const { return $1; }\n", {m_def.name, self});
+    return Write(m_out, R"(
+      const typename BC::FinalClass* _GetFinalSelf() const { return static_cast<const typename BC::FinalClass*>($self$); }
+    )",
+                 "self"_ = self);
+  }
+  Write(m_out, "$class$ const* _GetFinalSelf() const { return $self$; }\n", "class"_ = m_def.name, "self"_ = self);
+}
+
+void CachedFunction::WriteNameParts() {
+  if (!HasPairKey()) m_out << " << _GetKey()";
+  for (size_t i = 0; HasPairKey() && i < m_signature.arguments.size(); ++i) {
+    m_out << " << " << KeyPart(i, ".first << ','");
   }
 }
 
@@ -254,57 +348,13 @@ void CachedFunction::WriteAccessor(const std::string& value) {
   FunctionSignature accessor = m_signature;
   PrependOp(accessor.returnType, kOpConst);
   PrependOp(accessor.returnType, kOpReference);
-  WriteSignature(m_out, accessor);
-  m_out << "\n";
-  Block body(m_out);
-  m_out << "return " << value << ";\n";
-}
-
-void CachedFunction::WritePlain() {
-  const std::string& name = m_written.name;
-  const std::string base = BaseText("", "");
-  m_out << "struct " << Node() << " : public " << base << "\n";
-  {
-    Block node(m_out, " _dn_" + name + ";");
-    m_out << "typedef " << base << " base;\nusing typename base::output_type;\n";
-    WriteNodeMembers("");
-    WriteText(m_out, "$0 const* _GetSelf() const { return CONST_ATTRIB_CAST($0,_dn_$1); }\n", {m_def.name, name});
-    WriteFinalSelf("_GetSelf()");
-    WriteText(m_out, "virtual vesk::xstring Name() const { return \"$0::$1()\"; }\n", {m_def.name, name});
-    WriteQueueIndex();
-  }
-  WriteAccessor("_dn_" + name + ".read()");
-  m_def.m_evictionMembers.push_back("_dn_" + name);
-}
-
-void CachedFunction::WriteKeyed() {
-  const std::string& name = m_written.name;
-  const std::string base = BaseText("Keyed", KeyType());
-  m_out << "struct " << Node() << " : public " << base << "\n";
-  {
-    Block node(m_out, ";");
-    m_out << "typedef " << base << " base;\n";
-    m_out << "using typename base::key_type;\nusing typename base::output_type;\nusing typename base::map_type;\n";
-    WriteNodeMembers(KeyArguments());
-    WriteKeyedName();
-    WriteQueueIndex();
-    m_out << "map_type& _GetMap() const { return _self->_map_" << name << "; }\n";
-    WriteFinalSelf("_self");
-  }
-  m_out << "mutable typename " << Node() << "::map_type _map_" << name << ";\n";
-  WriteAccessor("_map_" + name + "[" + KeyExpression(0) + "].read(this)");
-  m_def.m_evictionMembers.push_back("_map_" + name);
-}
-
-void CachedFunction::WriteKeyedName() {
-  const size_t count = m_signature.arguments.size();
-  m_out << "virtual vesk::xstring Name() const\n";
-  Block body(m_out);
-  if (count > 1) m_out << KeyType() << " const& _key = _GetKey();\n";
-  m_out << "return vxMakeString(\"" << m_def.name << "::" << m_written.name << "(\"";
-  if (count == 1) m_out << " << _GetKey()";
-  for (size_t i = 0; count > 1 && i < count; ++i) m_out << " << " << KeyPart(i, ".first << ','");
-  m_out << " << ')');\n";
+  Write(m_out, R"(
+    $signature$
+    {
+        return $value$;
+    }
+  )",
+        "signature"_ = accessor, "value"_ = value);
 }
 
 }  // namespace

@@ -4,6 +4,7 @@
 
 #include "translator/class/text_checks.h"
 #include "translator/declared/class_def.h"
+#include "translator/emit/emit.h"
 #include "translator/reader/qrex_parser.h"
 
 namespace qrex {
@@ -91,8 +92,7 @@ void ParseFieldOrMethod(QrexParser& parser, ClassDef& def) {
     parser.Fail("; expected after field declaration when read " + Printed(parser.current));
   }
   if (!def.ExternalDefinition()) {
-    PrintType(parser.out, member.returnType);
-    parser.out << " " << name << ";";
+    Write(parser.out, "$type$ $name$;", "type"_ = TypeView(member.returnType), "name"_ = name);
     parser.Flush();
   }
   def.m_fields.push_back({name, member.returnType, FieldKind::Plain, def.m_reflected});

@@ -12,23 +12,27 @@ namespace qrex {
 
 namespace {
 
-constexpr std::string_view kArchiveFunctions =
-    "void Serialise(vesk::Archive&) const;\n"
-    "void Deserialise(vesk::InputArchive&);\n";
-
 void WriteFieldAccessors(TextWriter& out, const ClassDef& def) {
   for (const ClassField& field : def.m_fields) {
     if (field.kind != FieldKind::Plain) continue;
-    WriteText(out,
-              "$0 Get$1() const { return $1; }\n"
-              "void Set$1($0 _v) { $1 = _v; }\n",
-              {TypeText(field.type), field.name});
+    Write(out, R"(
+      $type$ Get$name$() const { return $name$; }
+      void Set$name$($type$ _v) { $name$ = _v; }
+    )",
+          "type"_ = TypeView(field.type), "name"_ = field.name);
   }
+}
+
+void WriteArchiveDeclarations(TextWriter& out) {
+  Write(out, R"(
+    void Serialise(vesk::Archive&) const;
+    void Deserialise(vesk::InputArchive&);
+  )");
 }
 
 void WriteArchiveMembers(TextWriter& out, const ClassDef& def) {
   if (!def.HasEmbeddedModel()) {
-    if (def.m_referencedModel) out << kArchiveFunctions;
+    if (def.m_referencedModel) WriteArchiveDeclarations(out);
     return;
   }
   if (def.MemberPlacement() == Placement::InClass) {
@@ -37,98 +41,121 @@ void WriteArchiveMembers(TextWriter& out, const ClassDef& def) {
     if (!def.m_inheritsModel) WriteVisiting(out, def, Placement::InClass);
     return;
   }
-  if (def.CanSerialiseEmbeddedModel()) out << kArchiveFunctions;
+  if (def.CanSerialiseEmbeddedModel()) WriteArchiveDeclarations(out);
   if (!def.m_inheritsModel) WriteVisitingDeclarations(out, def);
 }
 
-void WriteQueryInterface(TextWriter& out, const ClassDef& def, std::string_view scope) {
-  out << "\nvesk::AnyInterface " << scope << "QueryInterface(const vesk::ReflectedInterface& _ri)\n";
-  Block body(out);
+void WriteQueries(TextWriter& out, const ClassDef& def) {
   for (const InterfaceDef* interface : AllInterfaces(def)) {
     if (!interface->m_reflected) continue;
-    WriteText(out,
-              "if (&_ri == &vesk::GetReflectedInterface<$0 >()) { vesk::ptr<$0> p(this); "
-              "return reinterpret_cast<vesk::AnyInterface&>(p); }\n",
-              {interface->GetQualifiedName()});
+    Write(out, R"(
+      if (&_ri == &vesk::GetReflectedInterface<$name$ >()) { vesk::ptr<$name$> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }
+    )",
+          "name"_ = interface->GetQualifiedName());
   }
-  out << "return vesk::AnyInterface();\n";
 }
 
-void WriteGetReflectedClass(TextWriter& out, const ClassDef& def, std::string_view scope) {
-  out << "vesk::ReflectedClass const* " << scope << "GetReflectedClass() const\n";
-  Block body(out);
-  if (def.m_reflected) {
-    out << "return &_GetReflected( (" << def.GetQualifiedName() << def.TemplateArgs() << "*) 0);\n";
-  } else {
-    out << "return NULL;\n";
-  }
+void WriteInterfaceMembers(TextWriter& out, const ClassDef& def, std::string_view scope) {
+  const std::string reflected =
+      def.m_reflected ? "&_GetReflected( (" + def.GetQualifiedName() + def.TemplateArgs() + "*) 0)" : "NULL";
+  Write(
+      out, R"(
+
+    vesk::AnyInterface $scope$QueryInterface(const vesk::ReflectedInterface& _ri)
+    {
+        $queries$
+        return vesk::AnyInterface();
+    }
+    vesk::ReflectedClass const* $scope$GetReflectedClass() const
+    {
+        return $reflected$;
+    }
+  )",
+      "scope"_ = scope, "queries"_ = [&] { WriteQueries(out, def); }, "reflected"_ = reflected);
 }
 
 void WriteInterfaceMembers(TextWriter& out, const ClassDef& def) {
   if (!def.m_implementsIObject) return;
   if (!def.HaveSomethingToRegister() || def.MemberPlacement() == Placement::InClass) {
-    WriteQueryInterface(out, def, "");
-    WriteGetReflectedClass(out, def, "");
-  } else {
-    out << "vesk::AnyInterface QueryInterface(const vesk::ReflectedInterface&);\n"
-           "vesk::ReflectedClass const* GetReflectedClass() const;\n";
+    return WriteInterfaceMembers(out, def, "");
   }
+  Write(out, R"(
+    vesk::AnyInterface QueryInterface(const vesk::ReflectedInterface&);
+    vesk::ReflectedClass const* GetReflectedClass() const;
+  )");
+}
+
+void WriteReflectionMembers(TextWriter& out, const ClassDef& def) {
+  if (!def.m_reflected) return;
+  if (HasCreateFunction(def)) out << "static vesk::ptr<vesk::IObject> __stdcall sfnCreateInstance();\n";
+  if (def.IsMixin()) return;
+  if (def.IsTemplate()) {
+    out << "friend ";
+    return WriteGetReflected(out, def);
+  }
+  Write(out, "friend $api$vesk::ReflectedClass const& _GetReflected($class$ const*);\n", "api"_ = ExportPrefix(def),
+        "class"_ = def.name);
 }
 
 }  // namespace
 
 void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def) {
-  const std::string scope = def.GetQualifiedName() + def.TemplateArgs() + "::";
-  WriteQueryInterface(out, def, scope);
-  WriteGetReflectedClass(out, def, scope);
+  WriteInterfaceMembers(out, def, def.GetQualifiedName() + def.TemplateArgs() + "::");
 }
 
 void WriteClassMembers(TextWriter& out, const ClassDef& def) {
   out << "public:\n";
-  IndentScope indent(out, 4);
-  WriteEvictDgsNodes(out, def);
-  if (!def.m_inheritsModel && def.HasEmbeddedModel()) WriteModelFieldsAndAccessors(out, def);
-  WriteFieldAccessors(out, def);
-  for (const ClassDef* mixin : def.m_mixins) WriteFieldAccessors(out, *mixin);
-  out << "\n";
-  WriteArchiveMembers(out, def);
-  if (def.m_reflected) {
-    if (def.HasDefaultCtor() && def.m_implementsIObject) {
-      out << "static vesk::ptr<vesk::IObject> __stdcall sfnCreateInstance();\n";
-    }
-    if (!def.IsMixin()) {
-      out << "friend ";
-      if (def.IsTemplate()) {
-        WriteGetReflected(out, def);
-      } else {
-        out << ExportPrefix(def) << "vesk::ReflectedClass const& _GetReflected(" << def.name << " const*);\n";
-      }
-    }
-  }
-  WriteInterfaceMembers(out, def);
+  const IndentScope indent(out, 4);
+  Write(
+      out, R"(
+    $evict$
+    $model$
+    $fieldAccessors$
+
+    $archive$
+    $reflection$
+    $interfaces$
+  )",
+      "evict"_ = [&] { WriteEvictDgsNodes(out, def); },
+      "model"_ = If(!def.m_inheritsModel && def.HasEmbeddedModel(), [&] { WriteModelFieldsAndAccessors(out, def); }),
+      "fieldAccessors"_ =
+          [&] {
+            WriteFieldAccessors(out, def);
+            for (const ClassDef* mixin : def.m_mixins) WriteFieldAccessors(out, *mixin);
+          },
+      "archive"_ = [&] { WriteArchiveMembers(out, def); }, "reflection"_ = [&] { WriteReflectionMembers(out, def); },
+      "interfaces"_ = [&] { WriteInterfaceMembers(out, def); });
 }
 
 void WriteEvictDgsNodes(TextWriter& out, const ClassDef& def) {
-  bool hasNode = def.m_hasEvictBlock || !def.m_evictionMembers.empty();
-  for (const ClassField& field : def.m_fields) hasNode = hasNode || field.kind != FieldKind::Plain;
-  if (!hasNode) return;
-  out << "void EvictDgsNodes() const\n";
-  Block body(out);
-  if (def.m_hasEvictBlock) out << "EvictDgsNodes_extra();\n";
-  if (!def.m_bases.empty() || def.m_inheritsModel || def.IsMixin() || def.m_implementsIPersistable ||
-      def.m_implementsIObject) {
-    out << "BaseClass::EvictDgsNodes();\n";
-  }
-  for (const ClassField& field : def.m_fields) {
-    if (field.kind != FieldKind::Plain) out << field.name << ".TryEvict(false);\n";
-  }
-  for (const std::string& member : def.m_evictionMembers) {
-    if (member.compare(0, 5, "_map_") == 0) {
-      out << "vesk::TryEvict(" << member << ");\n";
-    } else {
-      out << member << ".TryEvict(false);\n";
+  auto isNode = [](const ClassField& field) { return field.kind != FieldKind::Plain; };
+  const bool hasNode = std::any_of(def.m_fields.begin(), def.m_fields.end(), isNode);
+  if (!hasNode && !def.m_hasEvictBlock && def.m_evictionMembers.empty()) return;
+  const bool hasBase = !def.m_bases.empty() || def.m_inheritsModel || def.IsMixin() || def.m_implementsIPersistable ||
+                       def.m_implementsIObject;
+  auto evict = [&](const std::string& node) { Write(out, "$node$.TryEvict(false);\n", "node"_ = node); };
+  auto nodes = [&] {
+    for (const ClassField& field : def.m_fields) {
+      if (isNode(field)) evict(field.name);
     }
-  }
+    for (const std::string& member : def.m_evictionMembers) {
+      if (member.starts_with("_map_")) {
+        Write(out, "vesk::TryEvict($map$);\n", "map"_ = member);
+      } else {
+        evict(member);
+      }
+    }
+  };
+  Write(out, R"(
+    void EvictDgsNodes() const
+    {
+        $extra$
+        $base$
+        $nodes$
+    }
+  )",
+        "extra"_ = If(def.m_hasEvictBlock, "EvictDgsNodes_extra();"),
+        "base"_ = If(hasBase, "BaseClass::EvictDgsNodes();"), "nodes"_ = nodes);
 }
 
 namespace {
@@ -136,39 +163,90 @@ namespace {
 void WriteVisitorOperators(TextWriter& out, const ClassDef& def, std::string_view prefix, std::string_view name) {
   const bool hasModel = !def.IsMixin() && (def.HasEmbeddedModel() || def.m_referencedModel);
   if (!hasModel && (!def.IsIObjectVisitable() || def.m_implementsIObject)) return;
-  WriteText(out,
-            "\n$0inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$1 const& _x) "
-            "{ _x.VisitObjects(_v); return _v; }\n",
-            {prefix, name});
-  if (!hasModel) return;
-  if (!def.m_implementsIObject) {
-    WriteText(out, "$0inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$1 const*) { return _v; }\n",
-              {prefix, name});
-  }
-  WriteText(out,
-            "$0inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,$1 const& _x) "
-            "{ _x.VisitPrefs(_v); return _v; }\n",
-            {prefix, name});
+  auto pointer = [&] {
+    Write(out, R"(
+      $prefix$inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$class$ const*) { return _v; }
+    )",
+          "prefix"_ = prefix, "class"_ = name);
+  };
+  auto prefs = [&] {
+    Write(out, R"(
+      $prefix$inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,$class$ const& _x) { _x.VisitPrefs(_v); return _v; }
+    )",
+          "prefix"_ = prefix, "class"_ = name);
+  };
+  Write(out, R"(
+
+    $prefix$inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$class$ const& _x) { _x.VisitObjects(_v); return _v; }
+    $pointer$
+    $prefs$
+  )",
+        "prefix"_ = prefix, "class"_ = name, "pointer"_ = If(hasModel && !def.m_implementsIObject, pointer),
+        "prefs"_ = If(hasModel, prefs));
 }
 
+void WriteArchiveFunctions(TextWriter& out, std::string_view prefix, std::string_view name) {
+  Write(
+      out, R"(
+    $prefixLine$
+    template<typename Archive> inline void Serialise(Archive& _ar,$class$ const& _x) { _x.Serialise(_ar); }
+    $prefixLine$
+    template<typename Archive> inline void Deserialise(Archive& _ar,$class$& _x) { _x.Deserialise(_ar); }
+  )",
+      "prefixLine"_ = [&] { out << prefix << "\n"; }, "class"_ = name);
+}
+
+void WriteStreamInsertion(TextWriter& out, const ClassDef& def, std::string_view prefix, std::string_view name) {
+  if (def.qualifiers.os == TriState::Off) return;
+  if (def.qualifiers.os == TriState::Unset) {
+    if (!def.IsMixin()) WriteModelStreamInsertion(out, def);
+    return;
+  }
+  Write(out, R"(
+
+    $prefix$inline vesk::xostream& operator<<(vesk::xostream& _os,$class$ const& _x) { (($class$&)_x).Write(_os); return _os; }
+  )",
+        "prefix"_ = prefix, "class"_ = name);
+}
+
+void WriteImplementedInterfaces(TextWriter& out, const ClassDef& def) {
+  auto write = [&](std::string_view how, const InterfaceDef& interface) {
+    Write(out,
+          "template<> struct $how$_implements_interface<$class$,$interface$> { static const bool value = true; };\n",
+          "how"_ = how, "class"_ = def.GetQualifiedName(), "interface"_ = interface.GetQualifiedName());
+  };
+  auto isIn = [](const auto& interfaces, const InterfaceDef* interface) {
+    return std::find(interfaces.begin(), interfaces.end(), interface) != interfaces.end();
+  };
+  std::vector<const InterfaceDef*> inherited;
+  for (const InterfaceDef* interface : def.m_interfaces) {
+    write("directly", *interface);
+    for (const InterfaceDef::FlatBase& flat : interface->FlattenedBases()) {
+      if (!isIn(inherited, flat.base)) inherited.push_back(flat.base);
+    }
+  }
+  for (const InterfaceDef* interface : inherited) {
+    if (!isIn(def.m_interfaces, interface)) write("indirectly", *interface);
+  }
+}
+
+// The functions of a method begin with the line end that would close the text ahead of them.
 void WriteForwarder(TextWriter& out, const ClassDef& def, const FunctionSignature& method) {
-  out << "\ninline ";
-  PrintType(out, method.returnType);
-  out << " __stdcall " << method.name << "(";
-  WriteSelfAndArgDeclarations(out, def.name, method);
-  out << ") { ";
-  WriteReturn(out, method.returnType);
-  out << "_self->" << method.name << "(";
-  WriteArgNames(out, method.arguments);
-  out << "); }";
+  out << "\n";
+  Write(
+      out, "inline $type$ __stdcall $method$($parameters$) { $return$_self->$method$($arguments$); }",
+      "type"_ = TypeView(method.returnType), "method"_ = method.name,
+      "parameters"_ = [&] { WriteSelfAndArgDeclarations(out, def.name, method); },
+      "return"_ = If(!IsVoid(method.returnType), "return "),
+      "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
 }
 
 void WriteAdtFunction(TextWriter& out, const ClassDef& def, const FunctionSignature& method) {
-  out << "\n" << ExportPrefix(def);
-  PrintType(out, method.returnType);
-  out << " __stdcall " << method.name << "(";
-  WriteSelfAndArgDeclarations(out, def.name, method);
-  out << ");";
+  out << "\n";
+  Write(
+      out, "$api$$type$ __stdcall $method$($parameters$);", "api"_ = ExportPrefix(def),
+      "type"_ = TypeView(method.returnType), "method"_ = method.name,
+      "parameters"_ = [&] { WriteSelfAndArgDeclarations(out, def.name, method); });
 }
 
 }  // namespace
@@ -177,20 +255,8 @@ void WriteClassOperators(TextWriter& out, const ClassDef& def) {
   const std::string& name = def.GetTemplateClassName();
   const std::string prefix = def.TemplatePrefix();
   WriteVisitorOperators(out, def, prefix, name);
-  if (def.WriteInsertionExtractionInTermsOfSerialise()) {
-    WriteText(out,
-              "$0\ntemplate<typename Archive> inline void Serialise(Archive& _ar,$1 const& _x) { _x.Serialise(_ar); }\n"
-              "$0\ntemplate<typename Archive> inline void Deserialise(Archive& _ar,$1& _x) { _x.Deserialise(_ar); }\n",
-              {prefix, name});
-  }
-  if (def.qualifiers.os == TriState::On) {
-    WriteText(out,
-              "\n$0inline vesk::xostream& operator<<(vesk::xostream& _os,$1 const& _x) "
-              "{ (($1&)_x).Write(_os); return _os; }\n",
-              {prefix, name});
-  } else if (def.qualifiers.os == TriState::Unset && !def.IsMixin()) {
-    WriteModelStreamInsertion(out, def);
-  }
+  if (def.WriteInsertionExtractionInTermsOfSerialise()) WriteArchiveFunctions(out, prefix, name);
+  WriteStreamInsertion(out, def, prefix, name);
   if (def.IsAdt() && def.status == DeclStatus::Deferred) {
     WriteReflectionDeclarations(out, def);
     for (const FunctionSignature& method : def.m_methods) WriteAdtFunction(out, def, method);
@@ -200,45 +266,37 @@ void WriteClassOperators(TextWriter& out, const ClassDef& def) {
 }
 
 void ClassDef::WriteExtraTraits(TextWriter& out) const {
-  const std::string& qualified = GetQualifiedName();
-  const std::pair<std::string_view, bool> traits[] = {
-      {"has_reflected_default_ctor", m_reflected && HasDefaultCtor()},
-      {"has_reflected_dtor", m_reflected && HasDtor()},
-      {"has_reflected_copy_ctor", m_reflected && HasCopy()},
-      {"has_reflected_equality", m_reflected && HasEquality()},
-      {"has_reflected_compare", m_reflected && HasEquality()},
-      {"has_reflected_write_xostream", m_reflected && HasPrint()},
-      {"has_reflected_serialise", m_reflected && HasSerialise()},
-      {"has_reflected_visit_IObjects", m_reflected && IsIObjectVisitable()},
-      {"has_reflected_visit_Prefs", m_reflected && IsPrefVisitable()},
-      {"implements_IObject", m_implementsIObject},
-      {"implements_IPersistable", m_implementsIPersistable},
-      {"can_serialise_model", CanSerialiseEmbeddedModel()},
-      {"has_model", HasEmbeddedModel()},
-      {"using_model_base_class", m_inheritsModel},
-  };
-  out << "template<> struct ClassTypeTraits<" << qualified << ">\n";
-  {
-    Block body(out, ";");
-    for (const auto& [name, value] : traits) out << "static const bool " << name << " = " << BitText(value) << ";\n";
-  }
-
-  auto writeImplements = [&](std::string_view how, const InterfaceDef& interface) {
-    WriteText(out, "template<> struct $0_implements_interface<$1,$2> { static const bool value = true; };\n",
-              {how, qualified, interface.GetQualifiedName()});
-  };
-  std::vector<const InterfaceDef*> inherited;
-  for (const InterfaceDef* interface : m_interfaces) {
-    writeImplements("directly", *interface);
-    for (const InterfaceDef::FlatBase& flat : interface->FlattenedBases()) {
-      if (std::find(inherited.begin(), inherited.end(), flat.base) == inherited.end()) inherited.push_back(flat.base);
-    }
-  }
-  for (const InterfaceDef* interface : inherited) {
-    if (std::find(m_interfaces.begin(), m_interfaces.end(), interface) == m_interfaces.end()) {
-      writeImplements("indirectly", *interface);
-    }
-  }
+  Write(
+      out, R"(
+    template<> struct ClassTypeTraits<$class$>
+    {
+        static const bool has_reflected_default_ctor = $hasDefaultCtor$;
+        static const bool has_reflected_dtor = $hasDtor$;
+        static const bool has_reflected_copy_ctor = $hasCopy$;
+        static const bool has_reflected_equality = $hasEquality$;
+        static const bool has_reflected_compare = $hasEquality$;
+        static const bool has_reflected_write_xostream = $hasPrint$;
+        static const bool has_reflected_serialise = $hasSerialise$;
+        static const bool has_reflected_visit_IObjects = $visitsObjects$;
+        static const bool has_reflected_visit_Prefs = $visitsPrefs$;
+        static const bool implements_IObject = $isIObject$;
+        static const bool implements_IPersistable = $isIPersistable$;
+        static const bool can_serialise_model = $canSerialiseModel$;
+        static const bool has_model = $hasModel$;
+        static const bool using_model_base_class = $inheritsModel$;
+    };
+    $implementedInterfaces$
+  )",
+      "class"_ = GetQualifiedName(), "hasDefaultCtor"_ = BitText(m_reflected && HasDefaultCtor()),
+      "hasDtor"_ = BitText(m_reflected && HasDtor()), "hasCopy"_ = BitText(m_reflected && HasCopy()),
+      "hasEquality"_ = BitText(m_reflected && HasEquality()), "hasPrint"_ = BitText(m_reflected && HasPrint()),
+      "hasSerialise"_ = BitText(m_reflected && HasSerialise()),
+      "visitsObjects"_ = BitText(m_reflected && IsIObjectVisitable()),
+      "visitsPrefs"_ = BitText(m_reflected && IsPrefVisitable()), "isIObject"_ = BitText(m_implementsIObject),
+      "isIPersistable"_ = BitText(m_implementsIPersistable),
+      "canSerialiseModel"_ = BitText(CanSerialiseEmbeddedModel()), "hasModel"_ = BitText(HasEmbeddedModel()),
+      "inheritsModel"_ = BitText(m_inheritsModel),
+      "implementedInterfaces"_ = [&] { WriteImplementedInterfaces(out, *this); });
 }
 
 std::vector<const InterfaceDef*> AllInterfaces(const ClassDef& def) {
@@ -251,15 +309,18 @@ std::vector<const InterfaceDef*> AllInterfaces(const ClassDef& def) {
 }
 
 void WriteForwardDeclaration(TextWriter& out, const ClassDef& def) {
-  out << def.TemplatePrefix() << def.StructWord() << def.name << ";\n";
+  Write(out, "$prefix$$struct$$class$;\n", "prefix"_ = def.TemplatePrefix(), "struct"_ = def.StructWord(),
+        "class"_ = def.name);
 }
 
 void WriteReflectionDeclarations(TextWriter& out, const ClassDef& def) {
   if (!def.m_reflected) return;
   if (def.MemberPlacement() == Placement::InClass) return WriteGetTypeOps(out, def);
-  for (std::string_view text : {"vesk::ReflectedClass const& _GetReflected(", "vesk::TypeOps const& _GetTypeOps("}) {
-    out << ExportPrefix(def) << text << def.GetTemplateClassName() << " const*);\n";
-  }
+  Write(out, R"(
+    $api$vesk::ReflectedClass const& _GetReflected($class$ const*);
+    $api$vesk::TypeOps const& _GetTypeOps($class$ const*);
+  )",
+        "api"_ = ExportPrefix(def), "class"_ = def.GetTemplateClassName());
 }
 
 }  // namespace qrex

@@ -162,10 +162,14 @@ void ClassHead::ComposeBase() {
   if (!m_rawBases.empty() && (m_haveMixinList || m_def.m_inheritsModel)) {
     m_folded = true;
     if (m_def.IsMixin()) {
-      m_out << "template <typename BC>\nstruct " << name << "__BASE : BC," << m_rawBases << " {};\n";
+      Write(m_out, R"(
+        template <typename BC>
+        struct $name$__BASE : BC,$bases$ {};
+      )",
+            "name"_ = name, "bases"_ = m_rawBases);
       m_base = name + "__BASE<BC>";
     } else {
-      m_out << "struct " << name << "__BASE : " << m_rawBases << " {};\n";
+      Write(m_out, "struct $name$__BASE : $bases$ {};\n", "name"_ = name, "bases"_ = m_rawBases);
       m_base = name + "__BASE";
     }
   } else {
@@ -202,11 +206,10 @@ bool ClassHead::WriteHead() {
       WriteTypeTraits(m_out, m_def);
       traitsWritten = true;
     }
-    m_out << m_def.TemplatePrefix("\n") << m_def.StructWord();
-    if (!m_def.IsAdt()) m_out << ExportPrefix(m_def);
-    m_out << m_def.name;
-    if (m_isFinal && isDefinition) m_out << " final";
-    if (isDefinition) WriteBases();
+    Write(m_out, "$prefix$$struct$$api$$name$$final$$bases$", "prefix"_ = m_def.TemplatePrefix("\n"),
+          "struct"_ = m_def.StructWord(), "api"_ = m_def.IsAdt() ? std::string() : ExportPrefix(m_def),
+          "name"_ = m_def.name, "final"_ = If(m_isFinal && isDefinition, " final"),
+          "bases"_ = If(isDefinition, [&] { WriteBases(); }));
   } else if (isDefinition) {
     m_out << "\n";
     WriteReflectionDeclarations(m_out, m_def);

@@ -212,10 +212,12 @@ void ClassStatement::ParseDefinition() {
     m_out << "\n";
     m_parser.Flush();
     if (!m_def->m_mixinBaseClass.empty()) {
-      m_out << "{\n";
-      if (m_def->kind == ClassKind::Class) m_out << "public:\n";
-      IndentScope indent(m_out, 4);
-      m_out << "typedef " << m_def->m_mixinBaseClass << " BaseClass;\n";
+      Write(m_out, R"(
+        {
+        $public$
+            typedef $base$ BaseClass;
+      )",
+            "public"_ = If(m_def->kind == ClassKind::Class, "public:"), "base"_ = m_def->m_mixinBaseClass);
       m_parser.DropBehindCurrent();
     }
   }

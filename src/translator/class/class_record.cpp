@@ -17,10 +17,11 @@ namespace {
 class ClassRecord {
  public:
   ClassRecord(TextWriter& out, const ClassDef& def) : m_out(out), m_def(def), m_name(def.name) {}
-  void Write();
+  void WriteFunction();
 
  private:
   std::vector<const ClassField*> ReflectedFields(bool dep) const;
+  void WriteTypeCodes(const std::vector<const ClassField*>& fields);
   void WriteFields();
   void WriteDepFields();
   void WriteModelFields();
@@ -28,8 +29,9 @@ class ClassRecord {
   void WriteMethods();
   void WriteMethodRow(const FunctionSignature& method);
   void WriteInterfaces();
+  void WriteArrays();
   void WriteRecord();
-  void WriteTableRow(size_t count, std::string_view suffix);
+  std::string Part(std::string_view suffix) const { return m_name + std::string(suffix); }
   uint32_t Flags() const;
 
   TextWriter& m_out;
@@ -52,47 +54,71 @@ std::vector<const ClassField*> ClassRecord::ReflectedFields(bool dep) const {
   return fields;
 }
 
+void ClassRecord::WriteTypeCodes(const std::vector<const ClassField*>& fields) {
+  for (const ClassField* field : fields) {
+    if (field->kind == FieldKind::Dep && IsVoid(field->type)) continue;  // keeps nothing
+    WriteTypeByteCode(m_out, m_name + "_" + field->name, m_strings, field->type);
+  }
+}
+
 void ClassRecord::WriteFields() {
   const std::vector<const ClassField*> fields = ReflectedFields(false);
   m_fieldCount = fields.size();
-  for (const ClassField* field : fields) WriteTypeByteCode(m_out, m_name + "_" + field->name, m_strings, field->type);
+  WriteTypeCodes(fields);
   if (fields.empty()) return;
-  m_out << "static const vesk::ReflectedField " << m_name << "_fields[] =\n";
-  Block rows(m_out, ";");
-  for (const ClassField* field : fields) {
-    WriteText(m_out, "{ \"$1\", offsetof($0,$1), $0_$1 },\n", {m_name, field->name});
-  }
+  auto row = [&](const ClassField* field) {
+    Write(m_out, "{ \"$field$\", offsetof($class$,$field$), $class$_$field$ },\n", "field"_ = field->name,
+          "class"_ = m_name);
+  };
+  Write(m_out, R"(
+    static const vesk::ReflectedField $class$_fields[] =
+    {
+        $rows$
+    };
+  )",
+        "class"_ = m_name, "rows"_ = Each(m_out, fields, "", row));
 }
 
 void ClassRecord::WriteDepFields() {
   const std::vector<const ClassField*> fields = ReflectedFields(true);
   m_depFieldCount = fields.size();
-  for (const ClassField* field : fields) {
-    if (!IsVoid(field->type)) WriteTypeByteCode(m_out, m_name + "_" + field->name, m_strings, field->type);
-  }
+  WriteTypeCodes(fields);
   if (fields.empty()) return;
-  m_out << "static const vesk::ReflectedDepField " << m_name << "_depfields[] =\n";
-  Block rows(m_out, ";");
-  for (const ClassField* field : fields) {
-    WriteText(m_out,
-              IsVoid(field->type) ? "{ \"$1\", 0, 0, offsetof($0,$1) },\n"
-                                  : "{ \"$1\", offsetof($0,_$1_), $0_$1, offsetof($0,$1) },\n",
-              {m_name, field->name});
-  }
+  auto row = [&](const ClassField* field) {
+    if (IsVoid(field->type)) {
+      Write(m_out, "{ \"$field$\", 0, 0, offsetof($class$,$field$) },\n", "field"_ = field->name, "class"_ = m_name);
+    } else {
+      Write(m_out, "{ \"$field$\", offsetof($class$,_$field$_), $class$_$field$, offsetof($class$,$field$) },\n",
+            "field"_ = field->name, "class"_ = m_name);
+    }
+  };
+  Write(m_out, R"(
+    static const vesk::ReflectedDepField $class$_depfields[] =
+    {
+        $rows$
+    };
+  )",
+        "class"_ = m_name, "rows"_ = Each(m_out, fields, "", row));
 }
 
 void ClassRecord::WriteMapOrSetFunctions(const ModelField& field) {
   TypeView type = MapOrSetIn(field.m_type);
   if (type.Empty()) return;
-  m_out << "static const vesk::PtrMapOrSetFns " << m_name << "_" << field.m_name << "_mapOrSetfns[] = \n";
-  Block rows(m_out, ";");
-  for (; !type.Empty(); type = MapOrSetIn(type.Value())) {
-    if (type.Op() == kOpSet) {
-      m_out << "{(const vesk::XMapFns*) &vesk::IXSet::Stubs<" << TypeText(type) << " >::GetTable()},\n";
-      return;
+  auto rows = [&] {
+    for (; !type.Empty(); type = MapOrSetIn(type.Value())) {
+      if (type.Op() == kOpSet) {
+        return Write(m_out, "{(const vesk::XMapFns*) &vesk::IXSet::Stubs<$type$ >::GetTable()},\n", "type"_ = type);
+      }
+      Write(m_out, "{&vesk::IXMap::Stubs<$type$ >::GetTable()},\n", "type"_ = type);
     }
-    m_out << "{&vesk::IXMap::Stubs<" << TypeText(type) << " >::GetTable()},\n";
-  }
+  };
+  Write(m_out, R"(
+    static const vesk::PtrMapOrSetFns $class$_$field$_mapOrSetfns[] =$blank$
+    {
+        $rows$
+    };
+  )",
+        "class"_ = m_name, "field"_ = field.m_name, "blank"_ = ' ', "rows"_ = rows);
 }
 
 void ClassRecord::WriteModelFields() {
@@ -102,21 +128,28 @@ void ClassRecord::WriteModelFields() {
     WriteMapOrSetFunctions(*mixed.field);
   }
   if (fields.empty() && !m_def.m_referencedModel) return;
-  m_out << "static const vesk::ReflectedModelField " << m_name << "_modelFields[] =\n";
-  Block rows(m_out, ";");
-  m_modelFieldCount = WriteModelFieldRows(m_out, m_def);
+  Write(
+      m_out, R"(
+    static const vesk::ReflectedModelField $class$_modelFields[] =
+    {
+        $rows$
+    };
+  )",
+      "class"_ = m_name, "rows"_ = [&] { m_modelFieldCount = WriteModelFieldRows(m_out, m_def); });
 }
 
 void ClassRecord::WriteMethodRow(const FunctionSignature& method) {
   const std::string prefix = m_name + "_" + method.name;
-  m_out << "{\"" << method.name << "\",{" << NameOrZero(!IsVoid(method.returnType), prefix + "_return") << "},";
-  m_out << CountedName(method.arguments.size(), prefix + "_args") << ","
-        << NameOrZero(!method.metadata.empty(), prefix + "_metadata") << "," << BoolText(method.isConst)
-        << ",(vesk::FunctionPointer)(";
-  PrintType(m_out, method.returnType);
-  m_out << " (__stdcall *)(";
-  WriteSelfAndArgDeclarations(m_out, m_name, method);
-  m_out << "))&" << (m_def.parent ? m_def.parent->GetQualifiedName() : std::string()) << "::" << method.name << "},\n";
+  Write(
+      m_out, R"(
+    {"$method$",{$return$},$arguments$,$metadata$,$isConst$,(vesk::FunctionPointer)($type$ (__stdcall *)($parameters$))&$scope$::$method$},
+  )",
+      "method"_ = method.name, "return"_ = NameOrZero(!IsVoid(method.returnType), prefix + "_return"),
+      "arguments"_ = CountedName(method.arguments.size(), prefix + "_args"),
+      "metadata"_ = NameOrZero(!method.metadata.empty(), prefix + "_metadata"), "isConst"_ = BoolText(method.isConst),
+      "type"_ = TypeView(method.returnType),
+      "parameters"_ = [&] { WriteSelfAndArgDeclarations(m_out, m_name, method); },
+      "scope"_ = m_def.parent ? m_def.parent->GetQualifiedName() : std::string());
 }
 
 void ClassRecord::WriteMethods() {
@@ -124,9 +157,14 @@ void ClassRecord::WriteMethods() {
     WriteSignatureArrays(m_out, m_name + "_" + method.name, method, m_strings);
   }
   if (m_def.m_methods.empty()) return;
-  m_out << "static const vesk::ReflectedClassMethod " << m_name << "_methods[] =\n";
-  Block rows(m_out, ";");
-  for (const FunctionSignature& method : m_def.m_methods) WriteMethodRow(method);
+  Write(m_out, R"(
+    static const vesk::ReflectedClassMethod $class$_methods[] =
+    {
+        $rows$
+    };
+  )",
+        "class"_ = m_name,
+        "rows"_ = Each(m_out, m_def.m_methods, "", [&](const FunctionSignature& method) { WriteMethodRow(method); }));
 }
 
 void ClassRecord::WriteInterfaces() {
@@ -134,10 +172,16 @@ void ClassRecord::WriteInterfaces() {
   for (const InterfaceDef* interface : m_def.m_interfaces) {
     for (const InterfaceDef::FlatBase& flat : interface->FlattenedBases()) m_flattened.push_back(flat.base);
   }
-  m_out << "static vesk::ConstStringZ " << m_name << "_interfaces[] =\n";
-  Block rows(m_out, ";");
-  for (const InterfaceDef* interface : m_flattened) m_out << "\"" << interface->GetQualifiedName() << "\",\n";
-  for (const InterfaceDef* interface : m_def.m_interfaces) m_out << "\"" << interface->GetQualifiedName() << "\",\n";
+  auto row = [&](const InterfaceDef* interface) { m_out << "\"" << interface->GetQualifiedName() << "\",\n"; };
+  Write(m_out, R"(
+    static vesk::ConstStringZ $class$_interfaces[] =
+    {
+        $flattened$
+        $direct$
+    };
+  )",
+        "class"_ = m_name, "flattened"_ = Each(m_out, m_flattened, "", row),
+        "direct"_ = Each(m_out, m_def.m_interfaces, "", row));
 }
 
 uint32_t ClassRecord::Flags() const {
@@ -153,37 +197,66 @@ uint32_t ClassRecord::Flags() const {
   return flags;
 }
 
-void ClassRecord::WriteTableRow(size_t count, std::string_view suffix) {
-  m_out << CountedName(count, m_name + std::string(suffix)) << ",\n";
-}
-
 void ClassRecord::WriteRecord() {
   const std::string& className = m_def.GetTemplateClassName();
-  m_out << "static const vesk::ReflectedClass " << m_name << "_class =\n";
-  Block record(m_out, ";");
-  m_out << Flags() << ",\n";
-  m_out << "\"" << m_def.GetQualifiedName() << "\",\n";
-  m_out << "sizeof(" << className << "),\n";
-  m_out << NameOrZero(!m_def.metadata.empty(), m_name + "_metadata") << ",\n";
-  WriteTableRow(m_fieldCount, "_fields");
-  WriteTableRow(m_modelFieldCount, "_modelFields");
-  WriteTableRow(m_depFieldCount, "_depfields");
-  WriteTableRow(m_def.m_methods.size(), "_methods");
-  m_out << NameOrZero(!m_strings.Empty(), m_name + "_stringTable") << ",\n";
-  if (m_def.m_interfaces.empty()) {
-    m_out << "0,0,0,\n";
-  } else {
-    m_out << m_name << "_interfaces," << m_flattened.size() << "," << m_def.m_interfaces.size() << ",\n";
-  }
-  m_out << NameOrZero(m_def.m_implementsIObject, "&vesk::IObject::Stubs<" + className + ">::GetTable()") << ",\n";
-  m_out << NameOrZero(HasCreateFunction(m_def), "&" + className + "::sfnCreateInstance") << ",\n";
-  Block ops(m_out);
-  WriteTypeOps(m_out, m_name, m_def.TypeOpsBits());
+  const std::string stubs = m_def.m_implementsIObject ? "&vesk::IObject::Stubs<" + className + ">::GetTable()" : "0";
+  auto interfaces = [&] {
+    if (m_def.m_interfaces.empty()) {
+      m_out << "0,0,0";
+    } else {
+      Write(m_out, "$class$_interfaces,$flattened$,$direct$", "class"_ = m_name, "flattened"_ = m_flattened.size(),
+            "direct"_ = m_def.m_interfaces.size());
+    }
+  };
+  Write(
+      m_out, R"(
+    static const vesk::ReflectedClass $class$_class =
+    {
+        $flags$,
+        "$qualifiedName$",
+        sizeof($templateClass$),
+        $metadata$,
+        $fields$,
+        $modelFields$,
+        $depFields$,
+        $methods$,
+        $strings$,
+        $interfaces$,
+        $stubs$,
+        $create$,
+        {
+            $operations$
+        }
+    };
+  )",
+      "class"_ = m_name, "flags"_ = Flags(), "qualifiedName"_ = m_def.GetQualifiedName(), "templateClass"_ = className,
+      "metadata"_ = NameOrZero(!m_def.metadata.empty(), Part("_metadata")),
+      "fields"_ = CountedName(m_fieldCount, Part("_fields")),
+      "modelFields"_ = CountedName(m_modelFieldCount, Part("_modelFields")),
+      "depFields"_ = CountedName(m_depFieldCount, Part("_depfields")),
+      "methods"_ = CountedName(m_def.m_methods.size(), Part("_methods")),
+      "strings"_ = NameOrZero(!m_strings.Empty(), Part("_stringTable")), "interfaces"_ = interfaces, "stubs"_ = stubs,
+      "create"_ = NameOrZero(HasCreateFunction(m_def), "&" + className + "::sfnCreateInstance"),
+      "operations"_ = [&] { WriteTypeOps(m_out, m_name, m_def.TypeOpsBits()); });
 }
 
-void ClassRecord::Write() {
-  m_out << ExportPrefix(m_def) << "vesk::ReflectedClass const& _GetReflected(" << m_name << " const*)\n";
-  Block body(m_out);
+void ClassRecord::WriteFunction() {
+  Write(
+      m_out, R"(
+    $api$vesk::ReflectedClass const& _GetReflected($class$ const*)
+    {
+        $arrays$
+        $record$
+
+        return $class$_class;
+    }
+  )",
+      "api"_ = ExportPrefix(m_def), "class"_ = m_name, "arrays"_ = [&] { WriteArrays(); },
+      "record"_ = [&] { WriteRecord(); });
+}
+
+// In the order in which the string table takes their names.
+void ClassRecord::WriteArrays() {
   if (!m_def.metadata.empty()) WriteMetadataByteCode(m_out, m_name + "_metadata", m_strings, m_def.metadata);
   WriteFields();
   WriteDepFields();
@@ -191,31 +264,35 @@ void ClassRecord::Write() {
   WriteMethods();
   WriteStringTable(m_out, m_strings, m_name);
   WriteInterfaces();
-  WriteRecord();
-  m_out << "\nreturn " << m_name << "_class;\n";
 }
 
 void WriteCreateInstance(TextWriter& out, const ClassDef& def) {
-  const std::string& className = def.GetTemplateClassName();
   auto found = std::find_if(def.m_interfaces.begin(), def.m_interfaces.end(),
                             [](const InterfaceDef* interface) { return interface->SubtypesIObject(); });
-  const std::string interface = found == def.m_interfaces.end() ? std::string() : (*found)->GetQualifiedName();
-  out << def.TemplatePrefix() << "vesk::ptr<vesk::IObject> __stdcall " << className << "::sfnCreateInstance()\n";
-  Block body(out);
-  out << "return static_cast<vesk::ptr<" << interface << "> >(new " << className << "());\n";
+  Write(out, R"(
+    $prefix$vesk::ptr<vesk::IObject> __stdcall $class$::sfnCreateInstance()
+    {
+        return static_cast<vesk::ptr<$interface$> >(new $class$());
+    }
+  )",
+        "prefix"_ = def.TemplatePrefix(), "class"_ = def.GetTemplateClassName(),
+        "interface"_ = found == def.m_interfaces.end() ? std::string() : (*found)->GetQualifiedName());
 }
 
 }  // namespace
 
 bool HasCreateFunction(const ClassDef& def) { return def.HasDefaultCtor() && def.m_implementsIObject; }
 
-void WriteGetReflected(TextWriter& out, const ClassDef& def) { ClassRecord(out, def).Write(); }
+void WriteGetReflected(TextWriter& out, const ClassDef& def) { ClassRecord(out, def).WriteFunction(); }
 
 void WriteGetTypeOps(TextWriter& out, const ClassDef& def) {
-  out << ExportPrefix(def) << def.TemplatePrefix() << "vesk::TypeOps const& _GetTypeOps(" << def.GetTemplateClassName()
-      << " const*)\n";
-  Block body(out);
-  out << "return vesk::GetReflectedClass<" << def.GetTemplateClassName() << ">().m_ops;\n";
+  Write(out, R"(
+    $api$$prefix$vesk::TypeOps const& _GetTypeOps($class$ const*)
+    {
+        return vesk::GetReflectedClass<$class$>().m_ops;
+    }
+  )",
+        "api"_ = ExportPrefix(def), "prefix"_ = def.TemplatePrefix(), "class"_ = def.GetTemplateClassName());
 }
 
 void ClassDef::WriteReflectedDefinition(TextWriter& out) {

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "translator/class/class_members.h"
+#include "translator/class/node_text.h"
 #include "translator/emit/emit.h"
 #include "translator/reader/code_block.h"
 #include "translator/reader/qrex_parser.h"
@@ -21,21 +22,24 @@ enum Section : unsigned {
   kVisit = 64,
 };
 
+// A section becomes the function NAME_WORD of the object.
 struct SectionWord {
   std::string_view word;
   Section section;
-  std::string_view head;  // $0 the field, $1 its parameter
+  std::string_view result;
+  enum class Takes { Nothing, Value, Visitor } takes;
   bool onIndep;
 };
 constexpr SectionWord kSections[] = {
-    {"calc", kCalc, "void $0_calc($1) const\n", false},
-    {"create", kCreate, "void $0_create($1) const\n", true},
-    {"destroy", kDestroy, "void $0_destroy($1) const\n", true},
-    {"visit", kVisit, "void $0_visit(vesk::IObjectVisitor& _v) const\n", true},
-    {"evictable", kEvictable, "bool $0_evictable() const\n", true},
-    {"evict", kEvict, "void $0_evict() const\n", true},
-    {"invalidate", kInvalidate, "void $0_invalidate() const\n", false},
+    {"calc", kCalc, "void", SectionWord::Takes::Value, false},
+    {"create", kCreate, "void", SectionWord::Takes::Value, true},
+    {"destroy", kDestroy, "void", SectionWord::Takes::Value, true},
+    {"visit", kVisit, "void", SectionWord::Takes::Visitor, true},
+    {"evictable", kEvictable, "bool", SectionWord::Takes::Nothing, true},
+    {"evict", kEvict, "void", SectionWord::Takes::Nothing, true},
+    {"invalidate", kInvalidate, "void", SectionWord::Takes::Nothing, false},
 };
+constexpr const SectionWord& kCalcSection = kSections[0];
 
 // One declaration, from its keyword to its `;`, and the text that it becomes.
 class NodeField {
@@ -66,30 +70,19 @@ class NodeField {
   void ReadSections();
   void ReadSection();
 
+  void WriteSectionHead(const SectionWord& section);
   void WriteDep();
-  void WriteDepMethods();
-  void WriteEviction();
   void WriteIndep();
-  void WriteVisitContainingObject();
+  void WriteCreation(std::string_view self);
+  void WriteDestructor(std::string_view node, std::string_view self);
+  void WriteVisiting();
+  void WriteRecalculation();
+  void WriteIsEvictable();
+  void WriteOnEvict();
+  void WriteOnInvalidate();
+  void WriteDepReaders();
 
   bool Has(Section section) const { return (m_sections & section) != 0; }
-  std::string Declaration(const std::string& name, DeclarationMode mode = DeclarationMode::Plain) const {
-    MemoryTextWriter text;
-    PrintDeclaration(text, m_type, name, mode);
-    return text.TakeText();
-  }
-  std::string Parameter() const { return m_isVoid ? "" : Declaration(m_name, DeclarationMode::Reference); }
-  std::string SelfStorage() const { return m_isVoid ? "" : "_self->" + m_storage; }
-  std::string ConstSelf() const {
-    return m_def.name + " const* _self = CONST_ATTRIB_CAST(" + m_def.name + "," + m_name + ");\n";
-  }
-  std::string Self() const { return m_def.name + "* _self = ATTRIB_CAST(" + m_def.name + "," + m_name + ");\n"; }
-  // A member function of the node that begins by finding the object.
-  void WriteMethod(const std::string& heading, const std::string& body) {
-    m_out << heading << "\n";
-    Block block(m_out);
-    m_out << body;
-  }
 
   QrexParser& m_parser;
   TextWriter& m_out;
@@ -97,7 +90,10 @@ class NodeField {
   const bool m_isIndep;
   std::string m_name;
   std::string m_storage;
+  std::string m_stored;  // the storage as the node names it; empty for void
+  std::string m_self;    // the line by which a node finds its object from its own place in it
   TypeCode m_type;
+  std::string_view m_passing;  // " const&" when not passed by value
   bool m_isVoid = false;
   bool m_hard = false;
   bool m_visit = true;
@@ -113,7 +109,10 @@ void NodeField::ReadHead() {
   m_name = std::move(parsed->name);
   m_type = std::move(parsed->type);
   m_storage = "_" + m_name + "_";
+  m_passing = PassingSuffix(m_type);
   m_isVoid = TypeView(m_type).Op() == kOpVoid;
+  if (!m_isVoid) m_stored = "_self->" + m_storage;
+  m_self = m_def.name + " const* _self = CONST_ATTRIB_CAST(" + m_def.name + "," + m_name + ");";
   if (m_isVoid && m_isIndep) m_parser.Fail("void not permitted on $indep");
   m_hard = head.hard || m_isVoid;
   const bool repeats =
@@ -137,9 +136,14 @@ void NodeField::ReadVisitQualifier() {
 void NodeField::ReadShortForm() {
   const std::string body = ReadShortBody(m_parser, m_def, m_name);
   m_sections |= kCalc;
-  m_out << "void " << m_name << "_calc(" << Parameter() << ") const\n";
-  Block block(m_out);
-  m_out << body << "\n";
+  WriteSectionHead(kCalcSection);
+  Write(
+      m_out, R"(
+    {
+        $body$
+    }
+  )",
+      "body"_ = [&] { m_out << body << "\n"; });
 }
 
 void NodeField::ReadSections() {
@@ -158,121 +162,199 @@ void NodeField::ReadSection() {
   if (m_isIndep && !row->onIndep) m_parser.Fail(quoted + " can't be specified on $indep");
   if (Has(row->section)) m_parser.Fail(quoted + " already specified");
   m_sections |= row->section;
-  WriteText(m_out, row->head, {m_name, Parameter()});
+  WriteSectionHead(*row);
   m_parser.Advance();
   CopyCodeBlock(m_parser, m_def);
 }
 
 // --- Text
 
+void NodeField::WriteSectionHead(const SectionWord& section) {
+  auto parameter = [&] {
+    if (section.takes == SectionWord::Takes::Visitor) m_out << "vesk::IObjectVisitor& _v";
+    if (section.takes != SectionWord::Takes::Value || m_isVoid) return;
+    PrintDeclaration(m_out, m_type, m_name, DeclarationMode::Reference);
+  };
+  Write(m_out, "$result$ $name$_$word$($parameter$) const\n", "result"_ = section.result, "name"_ = m_name,
+        "word"_ = section.word, "parameter"_ = parameter);
+}
+
 void NodeField::WriteDep() {
-  const std::string node = "Depnode_" + m_name;
-  const std::string_view passing = PassingSuffix(m_type);
-  if (!m_isVoid) m_out << "mutable " << Declaration(m_storage) << ";\n";
-  m_out << "struct " << node << " : vesk::DGDepNode\n";
-  {
-    Block block(m_out, " " + m_name + ";");
-    m_out << "typedef " << Declaration("value_type") << ";\n";
-    m_out << node << "() : vesk::DGDepNode(vesk::DF_SYNC_DEP" << (m_hard ? "|vesk::DF_PROPAGATE_HARD_DIRTINESS)" : ")");
-    if (Has(kCreate)) {
-      WriteMethod("", ConstSelf() + "_self->" + m_name + "_create(" + SelfStorage() + ");\n");
-    } else {
-      m_out << " {}\n";
-    }
-    if (Has(kDestroy)) {
-      WriteMethod("~" + node + "()", ConstSelf() + "_self->" + m_name + "_destroy(" + SelfStorage() + ");\n");
-    }
-    WriteMethod(
-        "virtual vesk::ssize_t ByteSize() const",
-        m_isVoid ? "return 0;\n" : ConstSelf() + "return vesk::CacheValueAdditionalSize(" + SelfStorage() + ");\n");
-    WriteText(m_out, "virtual vesk::xstring Name() const { return \"$0::$1\"; }\n", {m_def.name, m_name});
-    WriteVisitContainingObject();
-    WriteDepMethods();
-    if (m_isVoid) {
-      m_out << "void read() const { ReadBarrier(); }\nvoid operator()() const { ReadBarrier(); }\n";
-    } else {
-      WriteText(m_out,
-                "value_type$0 read() const { return CONST_ATTRIB_CAST($1,$2)->Get$2(); }\n"
-                "operator value_type$0() const { return CONST_ATTRIB_CAST($1,$2)->Get$2(); }\n",
-                {passing, m_def.name, m_name});
-    }
-  }
+  const TypeView type = m_type;
+  if (!m_isVoid) Write(m_out, "mutable $type$ $storage$;\n", "type"_ = type, "storage"_ = m_storage);
+  Write(
+      m_out, R"(
+    struct Depnode_$name$ : vesk::DGDepNode
+    {
+        typedef $type$ value_type;
+        Depnode_$name$() : vesk::DGDepNode(vesk::DF_SYNC_DEP$hard$)$noCreation$
+        $creation$
+        $destructor$
+        virtual vesk::ssize_t ByteSize() const
+        {
+            $valueSelf$
+            return $additionalSize$;
+        }
+        virtual vesk::xstring Name() const { return "$class$::$name$"; }
+        $visiting$
+        $recalculation$
+        $isEvictable$
+        $onEvict$
+        $onInvalidate$
+        $readers$
+    } $name$;
+  )",
+      "name"_ = m_name, "class"_ = m_def.name, "type"_ = type,
+      "hard"_ = If(m_hard, "|vesk::DF_PROPAGATE_HARD_DIRTINESS"), "noCreation"_ = If(!Has(kCreate), " {}"),
+      "creation"_ = [&] { WriteCreation(m_self); }, "destructor"_ = [&] { WriteDestructor("Depnode", m_self); },
+      "valueSelf"_ = If(!m_isVoid, m_self),
+      "additionalSize"_ = m_isVoid ? "0" : "vesk::CacheValueAdditionalSize(" + m_stored + ")",
+      "visiting"_ = [&] { WriteVisiting(); }, "recalculation"_ = [&] { WriteRecalculation(); },
+      "isEvictable"_ = [&] { WriteIsEvictable(); }, "onEvict"_ = [&] { WriteOnEvict(); },
+      "onInvalidate"_ = [&] { WriteOnInvalidate(); }, "readers"_ = [&] { WriteDepReaders(); });
   if (m_isVoid) return;
-  WriteText(m_out, "$0$1 Get$2() const { $2.ReadBarrier(); return $3; }\n",
-            {TypeText(m_type), passing, m_name, m_storage});
-}
-
-void NodeField::WriteDepMethods() {
-  std::string recalc = ConstSelf();
-  if (!m_hard) recalc += "auto _prev = " + SelfStorage() + ";\n";
-  recalc += "_self->" + m_name + "_calc(" + SelfStorage() + ");\n";
-  if (!m_isVoid) recalc += "if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();\n";
-  recalc += m_hard ? "return true;\n" : "return _prev != " + SelfStorage() + ";\n";
-  WriteMethod("virtual bool RecalcCache() const", recalc);
-  WriteMethod("virtual bool IsEvictable() const",
-              Has(kEvictable) ? ConstSelf() + "return _self->" + m_name + "_evictable();\n"
-              : m_isVoid      ? std::string("return true;\n")
-                              : ConstSelf() + "return vesk::CacheValueIsEvictable(" + SelfStorage() + ");\n");
-  WriteEviction();
-  if (Has(kInvalidate)) {
-    WriteMethod("virtual void OnInvalidate() const", ConstSelf() + "_self->" + m_name + "_invalidate();\n");
-  }
-}
-
-void NodeField::WriteEviction() {
-  if (!Has(kEvict) && m_isVoid) return;
-  WriteMethod("virtual void OnEvict() const",
-              ConstSelf() + (Has(kEvict) ? "_self->" + m_name + "_evict();\n"
-                                         : "vesk::OnEvictCacheValue(" + SelfStorage() + "); vesk::ClearCacheValue(" +
-                                               SelfStorage() + ");\n"));
-}
-
-void NodeField::WriteVisitContainingObject() {
-  std::string body;
-  if (Has(kVisit)) {
-    body = "_self->" + m_name + "_visit(_v);\n";
-  } else {
-    if (m_visit && !m_isVoid) body += "_v << " + SelfStorage() + ";\n";
-    if (m_def.IsMixin()) {
-      body += "_v << static_cast<const typename BC::FinalClass*>(_self);\n";
-    } else if (m_def.m_implementsIObject) {
-      body += "_v << _self;\n";
-    }
-  }
-  WriteMethod("virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const",
-              body.empty() ? body : ConstSelf() + body);
+  Write(m_out, "$type$$passing$ Get$name$() const { $name$.ReadBarrier(); return $storage$; }\n", "type"_ = type,
+        "passing"_ = m_passing, "name"_ = m_name, "storage"_ = m_storage);
 }
 
 void NodeField::WriteIndep() {
-  const std::string node = "Indepnode_" + m_name;
-  const std::string_view passing = PassingSuffix(m_type);
-  m_out << Declaration(m_storage) << ";\n";
-  m_out << "struct " << node << " : vesk::DGIndepNode\n";
-  {
-    Block block(m_out, " " + m_name + ";");
-    m_out << "typedef " << Declaration("value_type") << ";\n";
-    if (Has(kCreate)) WriteMethod(node + "()", Self() + "_self->" + m_name + "_create(" + SelfStorage() + ");\n");
-    if (Has(kDestroy)) {
-      WriteMethod("~" + node + "()", Self() + "_self->" + m_name + "_destroy(" + SelfStorage() + ");\n");
+  const std::string self = m_def.name + "* _self = ATTRIB_CAST(" + m_def.name + "," + m_name + ");";
+  Write(
+      m_out, R"(
+    $type$ $storage$;
+    struct Indepnode_$name$ : vesk::DGIndepNode
+    {
+        typedef $type$ value_type;
+        $constructor$
+        $creation$
+        $destructor$
+        virtual vesk::ssize_t ByteSize() const { return 0; }
+        virtual vesk::xstring Name() const { return "$class$::$name$"; }
+        $visiting$
+        $isEvictable$
+        $onEvict$
+        value_type$passing$ read() const { ReadBarrier(); return CONST_ATTRIB_CAST($class$,$name$)->$storage$; }
+        value_type& write() { OnChange(); return ATTRIB_CAST($class$,$name$)->$storage$; }
+        operator value_type$passing$() const { return CONST_ATTRIB_CAST($class$,$name$)->Get$name$(); }
+        void operator=(value_type$passing$ _v) { write() = _v; }
+    } $name$;
+    $type$$passing$ Get$name$() const { $name$.ReadBarrier(); return $storage$; }
+    void Set$name$($type$$passing$ _v) { $name$.OnChange(); $storage$ = _v; }
+  )",
+      "name"_ = m_name, "class"_ = m_def.name, "type"_ = TypeView(m_type), "passing"_ = m_passing,
+      "storage"_ = m_storage, "constructor"_ = If(Has(kCreate), "Indepnode_" + m_name + "()"),
+      "creation"_ = [&] { WriteCreation(self); }, "destructor"_ = [&] { WriteDestructor("Indepnode", self); },
+      "visiting"_ = [&] { WriteVisiting(); }, "isEvictable"_ = [&] { WriteIsEvictable(); },
+      "onEvict"_ = [&] { WriteOnEvict(); });
+}
+
+// --- Members of a node. Those of an $indep are written only where a section stands behind them.
+
+void NodeField::WriteCreation(std::string_view self) {
+  if (!Has(kCreate)) return;
+  Write(m_out, R"(
+    {
+        $self$
+        _self->$name$_create($stored$);
     }
-    m_out << "virtual vesk::ssize_t ByteSize() const { return 0; }\n";
-    WriteText(m_out, "virtual vesk::xstring Name() const { return \"$0::$1\"; }\n", {m_def.name, m_name});
-    WriteVisitContainingObject();
-    if (Has(kEvictable)) {
-      WriteMethod("virtual bool IsEvictable() const", ConstSelf() + "return _self->" + m_name + "_evictable();\n");
+  )",
+        "self"_ = self, "name"_ = m_name, "stored"_ = m_stored);
+}
+
+void NodeField::WriteDestructor(std::string_view node, std::string_view self) {
+  if (!Has(kDestroy)) return;
+  Write(m_out, R"(
+    ~$node$_$name$()
+    {
+        $self$
+        _self->$name$_destroy($stored$);
     }
-    if (Has(kEvict)) WriteMethod("virtual void OnEvict() const", ConstSelf() + "_self->" + m_name + "_evict();\n");
-    WriteText(m_out,
-              "value_type$0 read() const { ReadBarrier(); return CONST_ATTRIB_CAST($1,$2)->$3; }\n"
-              "value_type& write() { OnChange(); return ATTRIB_CAST($1,$2)->$3; }\n"
-              "operator value_type$0() const { return CONST_ATTRIB_CAST($1,$2)->Get$2(); }\n"
-              "void operator=(value_type$0 _v) { write() = _v; }\n",
-              {passing, m_def.name, m_name, m_storage});
+  )",
+        "node"_ = node, "self"_ = self, "name"_ = m_name, "stored"_ = m_stored);
+}
+
+// The value, then the object that holds it; or what the section visits.
+void NodeField::WriteVisiting() {
+  std::string value(If(m_visit && !m_isVoid, "_v << " + m_stored + ";"));
+  std::string_view object = m_def.IsMixin() ? "_v << static_cast<const typename BC::FinalClass*>(_self);"
+                                            : If(m_def.m_implementsIObject, "_v << _self;");
+  if (Has(kVisit)) {
+    value = "_self->" + m_name + "_visit(_v);";
+    object = {};
   }
-  WriteText(m_out,
-            "$0$1 Get$2() const { $2.ReadBarrier(); return $3; }\n"
-            "void Set$2($0$1 _v) { $2.OnChange(); $3 = _v; }\n",
-            {TypeText(m_type), passing, m_name, m_storage});
+  Write(m_out, R"(
+    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
+    {
+        $self$
+        $value$
+        $object$
+    }
+  )",
+        "self"_ = If(!value.empty() || !object.empty(), m_self), "value"_ = value, "object"_ = object);
+}
+
+void NodeField::WriteRecalculation() {
+  const NodeValue value{m_stored, m_isVoid ? "" : "value_type", m_hard ? "" : "auto"};
+  WriteRecalcCache(m_out, value, m_self,
+                   [&] { Write(m_out, "_self->$name$_calc($stored$);\n", "name"_ = m_name, "stored"_ = m_stored); });
+}
+
+void NodeField::WriteIsEvictable() {
+  if (m_isIndep && !Has(kEvictable)) return;
+  Write(m_out, R"(
+    virtual bool IsEvictable() const
+    {
+        $self$
+        return $isEvictable$;
+    }
+  )",
+        "self"_ = If(Has(kEvictable) || !m_isVoid, m_self),
+        "isEvictable"_ = Has(kEvictable) ? "_self->" + m_name + "_evictable()"
+                         : m_isVoid      ? "true"
+                                         : "vesk::CacheValueIsEvictable(" + m_stored + ")");
+}
+
+void NodeField::WriteOnEvict() {
+  if (!Has(kEvict) && (m_isIndep || m_isVoid)) return;
+  auto clear = [&] {
+    Write(m_out, "vesk::OnEvictCacheValue($stored$); vesk::ClearCacheValue($stored$);\n", "stored"_ = m_stored);
+  };
+  Write(m_out, R"(
+    virtual void OnEvict() const
+    {
+        $self$
+        $section$
+        $clear$
+    }
+  )",
+        "self"_ = m_self, "section"_ = If(Has(kEvict), "_self->" + m_name + "_evict();"),
+        "clear"_ = If(!Has(kEvict), clear));
+}
+
+void NodeField::WriteOnInvalidate() {
+  if (!Has(kInvalidate)) return;
+  Write(m_out, R"(
+    virtual void OnInvalidate() const
+    {
+        $self$
+        _self->$name$_invalidate();
+    }
+  )",
+        "self"_ = m_self, "name"_ = m_name);
+}
+
+void NodeField::WriteDepReaders() {
+  if (m_isVoid) {
+    return Write(m_out, R"(
+      void read() const { ReadBarrier(); }
+      void operator()() const { ReadBarrier(); }
+    )");
+  }
+  Write(m_out, R"(
+    value_type$passing$ read() const { return CONST_ATTRIB_CAST($class$,$name$)->Get$name$(); }
+    operator value_type$passing$() const { return CONST_ATTRIB_CAST($class$,$name$)->Get$name$(); }
+  )",
+        "passing"_ = m_passing, "class"_ = m_def.name, "name"_ = m_name);
 }
 
 // --- $evict, $visit
@@ -284,6 +366,12 @@ bool HasGeneratedBase(const ClassDef& def) {
 
 // What a class that needs registration declares in place is defined in its reflection tail.
 bool IsDefinedInTail(const ClassDef& def) { return def.HaveSomethingToRegister() && !def.IsTemplate(); }
+
+void DropBlock(QrexParser& parser) {
+  parser.Flush();
+  parser.DropBehindCurrent();
+  parser.Advance();
+}
 
 }  // namespace
 
@@ -300,39 +388,44 @@ void ParseEvict(QrexParser& parser, ClassDef& def) {
   const std::string content = ReadBraceContent(parser, def);
   parser.out << "void EvictDgsNodes_extra() const;\n";
   MemoryTextWriter deferred;
-  deferred << "void " << def.GetQualifiedName() << "::EvictDgsNodes_extra() const\n";
-  {
-    Block body(deferred);
-    deferred << content << "\n";
-  }
+  Write(
+      deferred, R"(
+    void $class$::EvictDgsNodes_extra() const
+    {
+        $content$
+    }
+  )",
+      "class"_ = def.GetQualifiedName(), "content"_ = [&] { deferred << content << "\n"; });
   def.m_deferredText += deferred.TakeText();
-  parser.Flush();
-  parser.DropBehindCurrent();
-  parser.Advance();
+  DropBlock(parser);
 }
 
 void ParseVisit(QrexParser& parser, ClassDef& def) {
   parser.Advance();
   def.m_hasVisitBlock = true;
-  const bool isDeferred = IsDefinedInTail(def);
   const std::string content = ReadBraceContent(parser, def);
-  MemoryTextWriter text;
-  text << "void " << (isDeferred ? def.GetQualifiedName() + "::" : "")
-       << "VisitObjects(vesk::IObjectVisitor& v) const\n";
-  {
-    Block body(text);
-    if (HasGeneratedBase(def)) text << "BaseClass::VisitObjects(v);\n";
-    text << content << "\n";
-  }
-  if (isDeferred) {
-    parser.out << "\nvoid VisitObjects(vesk::IObjectVisitor& v) const;\n";
-    def.m_deferredText += text.TakeText();
+  auto define = [&](TextWriter& out, std::string_view scope) {
+    Write(
+        out, R"(
+      void $scope$VisitObjects(vesk::IObjectVisitor& v) const
+      {
+          $visitBase$
+          $content$
+      }
+    )",
+        "scope"_ = scope, "visitBase"_ = If(HasGeneratedBase(def), "BaseClass::VisitObjects(v);"),
+        "content"_ = [&] { out << content << "\n"; });
+  };
+  parser.out << "\n";
+  if (IsDefinedInTail(def)) {
+    parser.out << "void VisitObjects(vesk::IObjectVisitor& v) const;\n";
+    MemoryTextWriter deferred;
+    define(deferred, def.GetQualifiedName() + "::");
+    def.m_deferredText += deferred.TakeText();
   } else {
-    parser.out << "\n" << text.TakeText();
+    define(parser.out, "");
   }
-  parser.Flush();
-  parser.DropBehindCurrent();
-  parser.Advance();
+  DropBlock(parser);
 }
 
 }  // namespace qrex

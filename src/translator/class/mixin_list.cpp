@@ -57,10 +57,14 @@ class MixinList {
   std::string ParseAnonymousMixin() {
     ClassDef& mixin = MakeAnonymous(ClassKind::Mixin);
     TextWriter& out = m_parser.out;
-    WriteText(out,
-              "template <typename BC>\nstruct $0 : public BC\n{\n    typedef BC BaseClass;\n"
-              "    using typename BC::FinalClass;\n",
-              {mixin.name});
+    Write(out, R"(
+      template <typename BC>
+      struct $name$ : public BC
+      {
+          typedef BC BaseClass;
+          using typename BC::FinalClass;
+    )",
+          "name"_ = mixin.name);
     m_parser.Flush();
     m_parser.DropBehindCurrent();
     ParseClassBody(m_parser, mixin);
@@ -128,8 +132,7 @@ class MixinList {
 // --- implementing
 
 void WriteMethod(TextWriter& out, const FunctionSignature& method) {
-  WriteSignature(out, method);
-  out << ";\n";
+  Write(out, "$signature$;\n", "signature"_ = method);
 }
 
 const std::vector<FunctionSignature>& ReadMethodOwner(QrexParser& parser, ClassDef& def,

@@ -64,8 +64,9 @@ void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, co
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "a,b"
 void WriteReturn(TextWriter& out, const TypeCode& returnType);                   // "return " unless void
 
-// "inline T name(T a=1,U b) const": a signature as C++.
+// "inline T name(T a=1,U b) const": a signature as C++. A hole may be one.
 void WriteSignature(TextWriter& out, const FunctionSignature& signature);
+inline void WriteValue(TextWriter& out, const FunctionSignature& signature) { WriteSignature(out, signature); }
 
 // Pieces of records: "NAME" or "0"; "NAME,count" or "0,0".
 std::string NameOrZero(bool present, const std::string& name);

@@ -8,12 +8,12 @@
 //     };
 //   )", "name"_ = def.name, "fields"_ = [&] { WriteFields(out, def); }, "equalities"_ = equalities);
 //
-// The first line end, the margin of the first line and the blanks of the last are no part of the text; a text on one
-// line stands as it is. `$name$` is a hole. A hole that is alone on its line writes whole lines, indented by the blanks
-// ahead of it: a text that gets its line end, and nothing at all when it is empty, or a function that writes line ends
-// itself. Within a line a text's further lines get the blanks of that line. An empty line gets the blanks of the line
-// ahead of it, as within an IndentScope. The text is parsed while compiling: a hole without a value or a value without
-// a hole is an error there, named by one of the functions in `emission_error`.
+// The first line end, the margin (that of the first line with text) and the blanks of the last line are no part of the
+// text; a text on one line stands as it is. `$name$` is a hole. A hole that is alone on its line writes whole lines,
+// indented by the blanks ahead of it: a text that gets its line end, and nothing at all when it is empty, or a function
+// that writes line ends itself. Within a line the further lines of what fills a hole get the blanks of that line. An
+// empty line gets the blanks of the line ahead of it, as within an IndentScope. The text is parsed while compiling: a
+// hole without a value or a value without a hole is an error there, named by one of the functions in `emission_error`.
 #pragma once
 
 #include <array>
@@ -87,7 +87,7 @@ class TextPieces {
     size_t margin = 0;
     if (text.starts_with('\n')) {
       text.remove_prefix(1);
-      while (margin < text.size() && text[margin] == ' ') ++margin;
+      margin = MarginOf(text);
       while (text.ends_with(' ')) text.remove_suffix(1);
     }
     m_text = text.data();
@@ -103,6 +103,13 @@ class TextPieces {
   }
 
  private:
+  static constexpr size_t MarginOf(std::string_view text) {
+    while (text.starts_with('\n')) text.remove_prefix(1);
+    size_t margin = 0;
+    while (margin < text.size() && text[margin] == ' ') ++margin;
+    return margin;
+  }
+
   constexpr void AddLine(std::string_view line, size_t margin) {
     for (; margin > 0 && !line.starts_with('\n'); --margin) {
       if (!line.starts_with(' ')) emission_error::LineBeginsLeftOfMargin();
@@ -179,20 +186,30 @@ void WriteIndentedText(TextWriter& out, std::string_view text, size_t blanks);
 
 template <typename T>
 void FillHole(TextWriter& out, const T& value, bool isLine, size_t blanks) {
-  constexpr bool isText = std::is_convertible_v<const T&, std::string_view>;
-  if constexpr (std::is_invocable_v<const T&>) {
-    if (!isLine || blanks == 0) return value();
-    const IndentScope indent(out, static_cast<int64_t>(blanks));
-    value();
-  } else if constexpr (isText) {
+  const auto columns = static_cast<int64_t>(blanks);
+  if constexpr (std::is_convertible_v<const T&, std::string_view>) {
     const std::string_view text(value);
     if (isLine && text.empty()) return;
     if (isLine) out << kBlanks.substr(0, blanks);
     WriteIndentedText(out, text, blanks);
     if (isLine) out << '\n';
+  } else if constexpr (std::is_invocable_v<const T&>) {
+    if (blanks == 0) return value();
+    if (isLine) {
+      const IndentScope lines(out, columns);
+      value();
+    } else {
+      const LineRestScope rest(out, columns);
+      value();
+    }
   } else {
     if (isLine) out << kBlanks.substr(0, blanks);
-    WriteValue(out, value);
+    if (std::is_integral_v<T> || blanks == 0) {
+      WriteValue(out, value);
+    } else {
+      const LineRestScope rest(out, columns);
+      WriteValue(out, value);
+    }
     if (isLine) out << '\n';
   }
 }
@@ -217,6 +234,15 @@ auto Each(TextWriter& out, const Items& items, std::string_view separator, Write
       isFirst = false;
       writeOne(item);
     }
+  };
+}
+
+// Fills a hole only under a condition: else the text is empty, and the function writes nothing.
+inline std::string_view If(bool condition, std::string_view text) { return condition ? text : std::string_view(); }
+template <typename WriteIt, typename = std::enable_if_t<std::is_invocable_v<WriteIt>>>
+auto If(bool condition, WriteIt write) {
+  return [condition, write] {
+    if (condition) write();
   };
 }
 

@@ -17,29 +17,34 @@ void WriteTail(ScannedFile& file, TextWriter& out, RegistrationLists& lists) {
   lists.unregisterNames.insert(lists.unregisterNames.end(), file.unregisterNames.begin(), file.unregisterNames.end());
 }
 
-// "a::b::N" as its name spaces and its last part.
-std::vector<std::string_view> PathParts(std::string_view qualifiedName) {
-  std::vector<std::string_view> parts;
+// "a::b::N" taken apart.
+struct QualifiedName {
+  std::vector<std::string_view> nameSpaces;
+  std::string_view name;
+};
+QualifiedName PartsOf(std::string_view qualifiedName) {
+  QualifiedName parts;
   for (size_t colons; (colons = qualifiedName.find("::")) != std::string_view::npos;
        qualifiedName.remove_prefix(colons + 2)) {
-    parts.push_back(qualifiedName.substr(0, colons));
+    parts.nameSpaces.push_back(qualifiedName.substr(0, colons));
   }
-  parts.push_back(qualifiedName);
+  parts.name = qualifiedName;
   return parts;
 }
 
 void WriteRegistrarDeclaration(TextWriter& out, std::string_view keyword, std::string_view qualifiedName) {
-  const std::vector<std::string_view> parts = PathParts(qualifiedName);
-  for (size_t i = 0; i + 1 < parts.size(); ++i) out << "namespace " << parts[i] << " { ";
-  out << "void _" << keyword << "_" << parts.back() << "(); ";
-  for (size_t i = 0; i + 1 < parts.size(); ++i) out << "}";
-  out << "\n";
+  const auto [nameSpaces, name] = PartsOf(qualifiedName);
+  Write(out, "$open$void _$keyword$_$name$(); $close$\n",
+        "open"_ = Each(out, nameSpaces, "", [&](std::string_view part) { out << "namespace " << part << " { "; }),
+        "keyword"_ = keyword, "name"_ = name,
+        "close"_ = Each(out, nameSpaces, "", [&](std::string_view) { out << "}"; }));
 }
 
 void WriteRegistrarCall(TextWriter& out, std::string_view keyword, std::string_view qualifiedName) {
-  const std::vector<std::string_view> parts = PathParts(qualifiedName);
-  for (size_t i = 0; i + 1 < parts.size(); ++i) out << parts[i] << "::";
-  out << "_" << keyword << "_" << parts.back() << "();\n";
+  const auto [nameSpaces, name] = PartsOf(qualifiedName);
+  Write(out, "$scope$_$keyword$_$name$();\n",
+        "scope"_ = Each(out, nameSpaces, "", [&](std::string_view part) { out << part << "::"; }), "keyword"_ = keyword,
+        "name"_ = name);
 }
 
 std::vector<const Project*> RegisteredDependencies(const Project& project) {
@@ -76,32 +81,44 @@ void WriteProjectRegistration(const ScannedFile& mainFile, const DeclarationRegi
   const std::string_view keyword = registry.isRegister ? "Register" : "Unregister";
   const bool onWindows = mainFile.host.Settings().systemName == "Windows";
   const std::vector<const Project*> dependencies = RegisteredDependencies(project);
-  out << "\n";
-  for (const Project* dependency : dependencies) {
-    if (dependency->targetType == TargetType::DynamicLinkLibrary) {
-      out << "extern \"C\" ";
-      if (onWindows) out << "__declspec(dllimport) ";
+  auto linkage = [&](const Project& declared, std::string_view windowsSpecifier) {
+    if (declared.targetType != TargetType::DynamicLinkLibrary) return;
+    out << "extern \"C\" " << If(onWindows, windowsSpecifier);
+  };
+  auto declaration = [&](const Project* dependency) {
+    Write(
+        out, "$linkage$void $keyword$_Project_$name$();\n",
+        "linkage"_ = [&] { linkage(*dependency, "__declspec(dllimport) "); }, "keyword"_ = keyword,
+        "name"_ = dependency->name);
+  };
+  auto call = [&](const Project* dependency) {
+    Write(out, "$keyword$_Project_$name$();\n", "keyword"_ = keyword, "name"_ = dependency->name);
+  };
+  auto eachRegistrar = [&](auto write) {
+    return Each(out, registry.entries, "", [&, write](const auto& entry) {
+      for (const std::string& name : entry.second) write(out, keyword, name);
+    });
+  };
+  Write(
+      out, R"(
+
+    $dependencies$
+
+    $registrars$
+
+    $linkage$void $keyword$_Project_$name$()
+    {
+        static bool s_called = false;
+        if (s_called) return;
+        s_called = true;
+        $dependencyCalls$
+        $registrarCalls$
     }
-    out << "void " << keyword << "_Project_" << dependency->name << "();\n";
-  }
-  out << "\n";
-  for (const auto& [path, names] : registry.entries) {
-    for (const std::string& name : names) WriteRegistrarDeclaration(out, keyword, name);
-  }
-  out << "\n";
-  if (project.targetType == TargetType::DynamicLinkLibrary) {
-    out << "extern \"C\" ";
-    if (onWindows) out << "_declspec(dllexport) ";
-  }
-  out << "void " << keyword << "_Project_" << project.name << "()\n";
-  Block body(out);
-  out << "static bool s_called = false;\n";
-  out << "if (s_called) return;\n";
-  out << "s_called = true;\n";
-  for (const Project* dependency : dependencies) out << keyword << "_Project_" << dependency->name << "();\n";
-  for (const auto& [path, names] : registry.entries) {
-    for (const std::string& name : names) WriteRegistrarCall(out, keyword, name);
-  }
+  )",
+      "dependencies"_ = Each(out, dependencies, "", declaration),
+      "registrars"_ = eachRegistrar(WriteRegistrarDeclaration),
+      "linkage"_ = [&] { linkage(project, "_declspec(dllexport) "); }, "keyword"_ = keyword, "name"_ = project.name,
+      "dependencyCalls"_ = Each(out, dependencies, "", call), "registrarCalls"_ = eachRegistrar(WriteRegistrarCall));
 }
 
 }  // namespace qrex

@@ -10,6 +10,7 @@
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/trace.h"
+#include "translator/emit/write.h"
 #include "translator/file/keywords.h"
 #include "translator/file/predefined_variables.h"
 #include "translator/file/tails.h"
@@ -99,9 +100,14 @@ void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded)
   QrexParserOutputStream stream(target, file.lineTable, expanded, file.expansionMap);
   TextWriter out(stream);
   if (kind == FileKind::H) {
-    const std::string guard = IncludeGuard(file.file.path);
     TextWriter head(target);  // not counted in the line table, which begins with the text proper
-    head << "#pragma once\n#ifndef " << guard << "\n#define " << guard << "\n\n";
+    Write(head, R"(
+      #pragma once
+      #ifndef $guard$
+      #define $guard$
+
+    )",
+          "guard"_ = IncludeGuard(file.file.path));
     head.Flush();
   }
   QrexParser(file, stream, out, expanded, AllKeywords()).Translate();

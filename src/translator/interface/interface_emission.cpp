@@ -13,165 +13,202 @@ namespace qrex {
 
 namespace {
 
-void WriteVoidSelf(TextWriter& out, const FunctionSignature& method) {
-  out << "void" << (method.isConst ? " const" : "") << "* _self";
-  for (const FunctionArg& argument : method.arguments) {
-    out << ",";
-    PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
-  }
+// The parameters of the function in a table that stands for a method.
+void WriteTableParameters(TextWriter& out, const FunctionSignature& method) {
+  Write(
+      out, "void$const$* _self$comma$$arguments$", "const"_ = If(method.isConst, " const"),
+      "comma"_ = If(!method.arguments.empty(), ","),
+      "arguments"_ = [&] { WriteArgDeclarations(out, method.arguments); });
 }
 
 void WriteTableSlot(TextWriter& out, const FunctionSignature& method) {
-  PrintType(out, method.returnType);
-  out << " (__stdcall *" << method.name << ")(";
-  WriteVoidSelf(out, method);
-  out << ")";
+  Write(
+      out, "$type$ (__stdcall *$method$)($parameters$);\n", "type"_ = TypeView(method.returnType),
+      "method"_ = method.name, "parameters"_ = [&] { WriteTableParameters(out, method); });
 }
 
 void WriteStub(TextWriter& out, const FunctionSignature& method) {
-  out << "static ";
-  PrintType(out, method.returnType);
-  out << " __stdcall " << method.name << "(";
-  WriteVoidSelf(out, method);
-  out << ") { ";
-  WriteReturn(out, method.returnType);
-  out << (method.isConst ? "((const T*)_self)->" : "((T*)_self)->") << method.name << "(";
-  WriteArgNames(out, method.arguments);
-  out << "); }\n";
+  Write(
+      out, "static $type$ __stdcall $method$($parameters$) { $return$(($const$T*)_self)->$method$($arguments$); }\n",
+      "type"_ = TypeView(method.returnType), "method"_ = method.name,
+      "parameters"_ = [&] { WriteTableParameters(out, method); }, "return"_ = If(!IsVoid(method.returnType), "return "),
+      "const"_ = If(method.isConst, "const "), "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
 }
 
-void WriteForwarder(TextWriter& out, const FunctionSignature& method, const std::string& path) {
-  WriteSignature(out, method);
-  out << " { ";
-  WriteReturn(out, method.returnType);
-  out << "m_table->" << path << method.name << "(m_self" << (method.arguments.empty() ? "" : ",");
-  WriteArgNames(out, method.arguments);
-  out << "); }\n";
+// `path` leads from the handle's table to that of the base that has the method.
+void WriteForwarder(TextWriter& out, const FunctionSignature& method, std::string_view path) {
+  Write(
+      out, "$signature$ { $return$m_table->$path$$method$(m_self$comma$$arguments$); }\n", "signature"_ = method,
+      "return"_ = If(!IsVoid(method.returnType), "return "), "path"_ = path, "method"_ = method.name,
+      "comma"_ = If(!method.arguments.empty(), ","), "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
+}
+
+void WriteForwarders(TextWriter& out, const InterfaceDef& interface,
+                     const std::vector<InterfaceDef::FlatBase>& flattened) {
+  for (const auto& [base, path] : flattened) {
+    for (const FunctionSignature& method : base->m_methods) WriteForwarder(out, method, path + ".");
+  }
+  for (const FunctionSignature& method : interface.m_methods) WriteForwarder(out, method, "");
 }
 
 void WriteBaseTable(TextWriter& out, const InterfaceDef& base) {
-  Block table(out, ",");
+  const Block table(out, ",");
   for (const InterfaceDef* deeper : base.m_bases) WriteBaseTable(out, *deeper);
   for (const FunctionSignature& method : base.m_methods) {
-    out << "&" << base.GetQualifiedName() << "::Stubs<T>::" << method.name << ",\n";
+    Write(out, "&$base$::Stubs<T>::$method$,\n", "base"_ = base.GetQualifiedName(), "method"_ = method.name);
   }
 }
 
-void WriteGetTable(TextWriter& out, const InterfaceDef& interface) {
-  out << "static const FnTable& GetTable()\n";
-  Block body(out);
-  out << "static const FnTable t";
+// The table of T's functions. Tables of bases are part of it by value.
+void WriteTable(TextWriter& out, const InterfaceDef& interface) {
   if (interface.m_bases.empty() && interface.m_methods.empty()) {
-    out << " = {};\n";
-  } else {
-    out << " =\n";
-    Block table(out, ";");
-    for (const InterfaceDef* base : interface.m_bases) WriteBaseTable(out, *base);
+    out << "static const FnTable t = {};\n";
+    return;
+  }
+  auto methods = [&] {
     for (const FunctionSignature& method : interface.m_methods) {
       out << "&" << method.name << (&method == &interface.m_methods.back() ? "\n" : ",\n");
     }
-  }
-  out << "return t;\n";
+  };
+  Write(out, R"(
+    static const FnTable t =
+    {
+        $baseTables$
+        $methods$
+    };
+  )",
+        "baseTables"_ = Each(out, interface.m_bases, "", [&](const InterfaceDef* base) { WriteBaseTable(out, *base); }),
+        "methods"_ = methods);
 }
 
 void WriteTables(TextWriter& out, const InterfaceDef& interface) {
-  out << "struct FnTable\n";
-  {
-    Block table(out, ";");
-    for (const InterfaceDef* base : interface.m_bases) {
-      out << base->GetQualifiedName() << "::FnTable _" << base->name << ";\n";
-    }
-    for (const FunctionSignature& method : interface.m_methods) {
-      WriteTableSlot(out, method);
-      out << ";\n";
-    }
+  auto baseTable = [&](const InterfaceDef* base) {
+    Write(out, "$base$::FnTable _$name$;\n", "base"_ = base->GetQualifiedName(), "name"_ = base->name);
+  };
+  Write(
+      out, R"(
+    struct FnTable
+    {
+        $baseTables$
+        $slots$
+    };
+    $name$(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
+
+    void AssignFrom($name$& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
+    void AssignFrom($name$ const& _rhs) const { const_cast<$name$*>(this)->m_self = _rhs.m_self; const_cast<$name$*>(this)->m_table = _rhs.m_table; }
+
+    template<typename T> struct Stubs
+    {
+        $stubs$
+        static const FnTable& GetTable()
+        {
+            $table$
+            return t;
+        }
+    };
+
+    template<typename T> void CoerceFrom(T* _rhs) { m_self = _rhs; m_table = &Stubs<T>::GetTable(); }
+    template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<$name$*>(this)->m_self = const_cast<T*>(_rhs); const_cast<$name$*>(this)->m_table = &Stubs<T>::GetTable(); }
+
+  )",
+      "name"_ = interface.name, "baseTables"_ = Each(out, interface.m_bases, "", baseTable),
+      "slots"_ = Each(out, interface.m_methods, "", [&](const auto& method) { WriteTableSlot(out, method); }),
+      "stubs"_ = Each(out, interface.m_methods, "", [&](const auto& method) { WriteStub(out, method); }),
+      "table"_ = [&] { WriteTable(out, interface); });
+}
+
+// An attribute has no storage: its struct stands in place of the object's address and calls the methods.
+void WriteAttributes(TextWriter& out, const InterfaceDef& interface) {
+  for (const AttributeDef& attribute : interface.m_attributes) {
+    AttributeWriter writer(out, *interface.owner.rootNameSpace, Access::Methods);
+    writer.WriteStruct(interface.name, attribute.type, attribute.name, attribute.name, attribute.name, false);
   }
-  WriteText(out,
-            "$0(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}\n\n"
-            "void AssignFrom($0& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }\n"
-            "void AssignFrom($0 const& _rhs) const { const_cast<$0*>(this)->m_self = _rhs.m_self; "
-            "const_cast<$0*>(this)->m_table = _rhs.m_table; }\n\n",
-            {interface.name});
-  out << "template<typename T> struct Stubs\n";
-  {
-    Block stubs(out, ";");
-    for (const FunctionSignature& method : interface.m_methods) WriteStub(out, method);
-    WriteGetTable(out, interface);
-  }
-  WriteText(out,
-            "\ntemplate<typename T> void CoerceFrom(T* _rhs) { m_self = _rhs; m_table = &Stubs<T>::GetTable(); }\n"
-            "template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<$0*>(this)->m_self = "
-            "const_cast<T*>(_rhs); const_cast<$0*>(this)->m_table = &Stubs<T>::GetTable(); }\n\n",
-            {interface.name});
 }
 
 }  // namespace
 
 void WriteInterfaceHandle(TextWriter& out, const InterfaceDef& interface) {
   const std::vector<InterfaceDef::FlatBase> flattened = interface.FlattenedBases();
-  out << "struct " << interface.name << "\n";
-  Block handle(out, ";");
-  WriteTables(out, interface);
-  for (const auto& [base, path] : flattened) {
-    for (const FunctionSignature& method : base->m_methods) WriteForwarder(out, method, path + ".");
-  }
-  for (const FunctionSignature& method : interface.m_methods) WriteForwarder(out, method, "");
-  if (!interface.m_bases.empty()) out << "\n";
-  for (const auto& [base, path] : flattened) {
-    WriteText(out, "operator $0() const { return $0(m_self, &m_table->$1); }\n", {base->GetQualifiedName(), path});
-  }
-  out << "\nunion\n";
-  {
-    Block attributes(out, ";");
-    for (const AttributeDef& attribute : interface.m_attributes) {
-      AttributeWriter writer(out, *interface.owner.rootNameSpace, Access::Methods);
-      writer.WriteStruct(interface.name, attribute.type, attribute.name, attribute.name, attribute.name, false);
-    }
-    out << "void* m_self;\n";
-  }
-  out << "FnTable const* m_table;\n";
+  auto conversion = [&](const InterfaceDef::FlatBase& flat) {
+    Write(out, "operator $base$() const { return $base$(m_self, &m_table->$path$); }\n",
+          "base"_ = flat.base->GetQualifiedName(), "path"_ = flat.path);
+  };
+  Write(
+      out, R"(
+    struct $name$
+    {
+        $tables$
+        $forwarders$
+        $emptyLine$
+        $conversions$
+
+        union
+        {
+            $attributes$
+            void* m_self;
+        };
+        FnTable const* m_table;
+    };
+  )",
+      "name"_ = interface.name, "tables"_ = [&] { WriteTables(out, interface); },
+      "forwarders"_ = [&] { WriteForwarders(out, interface, flattened); },
+      "emptyLine"_ = If(!flattened.empty(), [&] { out << "\n"; }),
+      "conversions"_ = Each(out, flattened, "", conversion), "attributes"_ = [&] { WriteAttributes(out, interface); });
 }
 
 void WriteInterfaceDeclarations(TextWriter& out, const InterfaceDef& interface) {
-  out << "template <typename BC>\nstruct " << interface.name << "DelegatorMixin : public BC\n";
-  {
-    Block body(out, ";");
-    for (const FunctionSignature& method : interface.m_methods) {
-      WriteSignature(out, method);
-      out << " { ";
-      WriteReturn(out, method.returnType);
-      out << "BC::Get" << interface.name << "()." << method.name << "(";
-      WriteArgNames(out, method.arguments);
-      out << "); }\n";
-    }
-  }
+  auto delegator = [&](const FunctionSignature& method) {
+    Write(
+        out, "$signature$ { $return$BC::Get$name$().$method$($arguments$); }\n", "signature"_ = method,
+        "return"_ = If(!IsVoid(method.returnType), "return "), "name"_ = interface.name, "method"_ = method.name,
+        "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
+  };
+  Write(out, R"(
+    template <typename BC>
+    struct $name$DelegatorMixin : public BC
+    {
+        $delegators$
+    };
+  )",
+        "name"_ = interface.name, "delegators"_ = Each(out, interface.m_methods, "", delegator));
   if (interface.m_registered) {
-    out << "\n"
-        << ExportPrefix(interface) << "vesk::ReflectedInterface const& _GetReflected(" << interface.name
-        << " const*);\n";
+    Write(out, R"(
+
+      $api$vesk::ReflectedInterface const& _GetReflected($name$ const*);
+    )",
+          "api"_ = ExportPrefix(interface), "name"_ = interface.name);
   }
   if (interface.m_isIpc || interface.m_isRmi) {
-    out << "\ninline vesk::ConstStringZ _GetIpcInterfaceName(" << interface.name << " const*) { return \""
-        << interface.GetQualifiedName() << "\"; }\n";
+    Write(out, R"(
+
+      inline vesk::ConstStringZ _GetIpcInterfaceName($name$ const*) { return "$qualifiedName$"; }
+    )",
+          "name"_ = interface.name, "qualifiedName"_ = interface.GetQualifiedName());
   }
 }
 
 void InterfaceDef::WriteExtraTraits(TextWriter& out) const {
-  const std::string& qualified = GetQualifiedName();
-  out << "template<> struct InterfaceTypeTraits<" << qualified << ">\n";
-  {
-    Block traits(out, ";");
-    out << "static const bool is_ipc = " << BoolText(m_isIpc) << ";\n";
-    out << "static const bool is_rmi = " << BoolText(m_isRmi) << ";\n";
-  }
-  auto write = [&](std::string_view how, const InterfaceDef& base) {
-    WriteText(out, "template<> struct _is_$0_superinterface_of<$1,$2> { static const bool value = true; };\n",
-              {how, base.GetQualifiedName(), qualified});
+  auto writeBase = [&](std::string_view how, const InterfaceDef& base) {
+    Write(out,
+          "template<> struct _is_$how$_superinterface_of<$base$,$interface$> { static const bool value = true; };\n",
+          "how"_ = how, "base"_ = base.GetQualifiedName(), "interface"_ = GetQualifiedName());
   };
-  for (const InterfaceDef* base : m_bases) write("direct", *base);
-  for (const FlatBase& flat : FlattenedBases()) {
-    if (std::find(m_bases.begin(), m_bases.end(), flat.base) == m_bases.end()) write("indirect", *flat.base);
-  }
+  auto indirectBase = [&](const FlatBase& flat) {
+    if (std::find(m_bases.begin(), m_bases.end(), flat.base) == m_bases.end()) writeBase("indirect", *flat.base);
+  };
+  const std::vector<FlatBase> flattened = FlattenedBases();
+  Write(out, R"(
+    template<> struct InterfaceTypeTraits<$interface$>
+    {
+        static const bool is_ipc = $isIpc$;
+        static const bool is_rmi = $isRmi$;
+    };
+    $directBases$
+    $indirectBases$
+  )",
+        "interface"_ = GetQualifiedName(), "isIpc"_ = BoolText(m_isIpc), "isRmi"_ = BoolText(m_isRmi),
+        "directBases"_ = Each(out, m_bases, "", [&](const InterfaceDef* base) { writeBase("direct", *base); }),
+        "indirectBases"_ = Each(out, flattened, "", indirectBase));
 }
 
 // --- Record
@@ -183,65 +220,107 @@ class InterfaceRecord {
   InterfaceRecord(TextWriter& out, const InterfaceDef& interface)
       : m_out(out), m_interface(interface), m_name(interface.name) {}
 
-  void Write() {
-    m_out << ExportPrefix(m_interface) << "vesk::ReflectedInterface const& _GetReflected(" << m_name << " const*)\n";
-    Block body(m_out);
-    if (!m_interface.metadata.empty()) {
-      WriteMetadataByteCode(m_out, m_name + "_metadata", m_strings, m_interface.metadata);
-    }
-    WriteBases();
-    for (const FunctionSignature& method : m_interface.m_methods) {
-      WriteSignatureArrays(m_out, m_name + "_" + method.name, method, m_strings);
-    }
-    WriteAttributes();
-    WriteStringTable(m_out, m_strings, m_name);
-    WriteMethods();
-    WriteInterface();
-    m_out << "return " << m_name << "_interface;\n";
+  void WriteFunction() {
+    Write(
+        m_out, R"(
+      $api$vesk::ReflectedInterface const& _GetReflected($name$ const*)
+      {
+          $metadata$
+          $bases$
+          $signatures$
+          $attributes$
+          $strings$
+          $methods$
+          $record$
+          return $name$_interface;
+      }
+    )",
+        "api"_ = ExportPrefix(m_interface), "name"_ = m_name, "metadata"_ = [&] { WriteMetadata(); },
+        "bases"_ = [&] { WriteBases(); }, "signatures"_ = [&] { WriteSignatures(); },
+        "attributes"_ = [&] { WriteAttributeTable(); },
+        "strings"_ = [&] { WriteStringTable(m_out, m_strings, m_name); }, "methods"_ = [&] { WriteMethods(); },
+        "record"_ = [&] { WriteRecord(); });
   }
 
  private:
-  void WriteBases() {
-    if (m_interface.m_bases.empty()) return;
-    m_out << "static vesk::ConstStringZ " << m_name << "_bases[] =\n";
-    Block rows(m_out, ";");
-    for (const InterfaceDef* base : m_interface.m_bases) m_out << "\"" << base->GetQualifiedName() << "\",\n";
+  void WriteMetadata() {
+    if (m_interface.metadata.empty()) return;
+    WriteMetadataByteCode(m_out, m_name + "_metadata", m_strings, m_interface.metadata);
   }
 
-  void WriteAttributes() {
+  void WriteBases() {
+    if (m_interface.m_bases.empty()) return;
+    auto row = [&](const InterfaceDef* base) { m_out << "\"" << base->GetQualifiedName() << "\",\n"; };
+    Write(m_out, R"(
+      static vesk::ConstStringZ $name$_bases[] =
+      {
+          $rows$
+      };
+    )",
+          "name"_ = m_name, "rows"_ = Each(m_out, m_interface.m_bases, "", row));
+  }
+
+  void WriteSignatures() {
+    for (const FunctionSignature& method : m_interface.m_methods) {
+      WriteSignatureArrays(m_out, m_name + "_" + method.name, method, m_strings);
+    }
+  }
+
+  void WriteAttributeTable() {
+    if (m_interface.m_attributes.empty()) return;
     for (const AttributeDef& attribute : m_interface.m_attributes) {
       WriteTypeByteCode(m_out, m_name + "_" + attribute.name, m_strings, attribute.type);
     }
-    if (m_interface.m_attributes.empty()) return;
-    m_out << "static const vesk::ReflectedAttribute " << m_name << "_attributes[] =\n";
-    Block rows(m_out, ";");
-    for (const AttributeDef& attribute : m_interface.m_attributes) {
-      WriteText(m_out, "{ \"$1\",$0_$1 },\n", {m_name, attribute.name});
-    }
+    auto row = [&](const AttributeDef& attribute) {
+      Write(m_out, "{ \"$attribute$\",$name$_$attribute$ },\n", "attribute"_ = attribute.name, "name"_ = m_name);
+    };
+    Write(m_out, R"(
+      static const vesk::ReflectedAttribute $name$_attributes[] =
+      {
+          $rows$
+      };
+    )",
+          "name"_ = m_name, "rows"_ = Each(m_out, m_interface.m_attributes, "", row));
   }
 
   void WriteMethods() {
     if (m_interface.m_methods.empty()) return;
-    m_out << "static const vesk::ReflectedInterfaceMethod " << m_name << "_methods[] =\n";
-    Block rows(m_out, ";");
-    for (const FunctionSignature& method : m_interface.m_methods) {
+    auto row = [&](const FunctionSignature& method) {
       const std::string prefix = m_name + "_" + method.name;
-      m_out << "{\"" << method.name << "\",{" << NameOrZero(!IsVoid(method.returnType), prefix + "_return") << "},"
-            << CountedName(method.arguments.size(), prefix + "_args") << ","
-            << NameOrZero(!method.metadata.empty(), prefix + "_metadata") << "},\n";
-    }
+      Write(m_out, "{\"$method$\",{$return$},$arguments$,$metadata$},\n", "method"_ = method.name,
+            "return"_ = NameOrZero(!IsVoid(method.returnType), prefix + "_return"),
+            "arguments"_ = CountedName(method.arguments.size(), prefix + "_args"),
+            "metadata"_ = NameOrZero(!method.metadata.empty(), prefix + "_metadata"));
+    };
+    Write(m_out, R"(
+      static const vesk::ReflectedInterfaceMethod $name$_methods[] =
+      {
+          $rows$
+      };
+    )",
+          "name"_ = m_name, "rows"_ = Each(m_out, m_interface.m_methods, "", row));
   }
 
-  void WriteInterface() {
-    m_out << "static const vesk::ReflectedInterface " << m_name << "_interface =\n";
-    Block record(m_out, ";");
-    m_out << "\"" << m_interface.GetQualifiedName() << "\",\n";
-    m_out << NameOrZero(!m_interface.metadata.empty(), m_name + "_metadata") << ",\n";
-    m_out << CountedName(m_interface.m_bases.size(), m_name + "_bases") << ",\n";
-    m_out << m_interface.InheritedMethodCount() << ",\n";
-    m_out << CountedName(m_interface.m_methods.size(), m_name + "_methods") << ",\n";
-    m_out << CountedName(m_interface.m_attributes.size(), m_name + "_attributes") << ",\n";
-    m_out << NameOrZero(!m_strings.Empty(), m_name + "_stringTable") << "\n";
+  void WriteRecord() {
+    Write(m_out, R"(
+      static const vesk::ReflectedInterface $name$_interface =
+      {
+          "$qualifiedName$",
+          $metadata$,
+          $bases$,
+          $inheritedMethods$,
+          $methods$,
+          $attributes$,
+          $strings$
+      };
+    )",
+          "name"_ = m_name, "qualifiedName"_ = m_interface.GetQualifiedName(),
+          "metadata"_ = NameOrZero(!m_interface.metadata.empty(), m_name + "_metadata"),
+          "bases"_ = CountedName(m_interface.m_bases.size(), m_name + "_bases"),
+          "inheritedMethods"_ = m_interface.InheritedMethodCount(),
+          "methods"_ = CountedName(m_interface.m_methods.size(), m_name + "_methods"),
+          "attributes"_ = CountedName(m_interface.m_attributes.size(), m_name + "_attributes"),
+          "strings"_ = NameOrZero(!m_strings.Empty(), m_name + "_stringTable"));
   }
 
   TextWriter& m_out;
@@ -252,7 +331,7 @@ class InterfaceRecord {
 
 }  // namespace
 
-void InterfaceDef::WriteReflectedDefinition(TextWriter& out) { InterfaceRecord(out, *this).Write(); }
+void InterfaceDef::WriteReflectedDefinition(TextWriter& out) { InterfaceRecord(out, *this).WriteFunction(); }
 
 void InterfaceDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   RecordedElement::WriteReflection(out, lists);

@@ -32,10 +32,7 @@ TypeView WithoutLeading(TypeView type, std::initializer_list<TypeOp> ops) {
 class RemoteText {
  public:
   RemoteText(TextWriter& out, const InterfaceDef& interface)
-      : m_out(out),
-        m_interface(interface),
-        m_name(interface.name),
-        m_count(std::to_string(interface.m_methods.size())) {}
+      : m_out(out), m_interface(interface), m_name(interface.name) {}
 
   void WriteStub();
   void WriteServer();  // skeleton or scion
@@ -43,7 +40,9 @@ class RemoteText {
  private:
   void WriteStubMethod(const FunctionSignature& method, size_t index);
   void WriteResultFunction(const FunctionSignature& method);
+  void WriteResponse(const FunctionSignature& method, size_t results);
   void WriteThunk(const FunctionSignature& method, size_t index);
+  void WriteIncoming(const FunctionSignature& method);
   void WriteThunkTable(std::string_view kind);
   void WriteFactory(std::string_view kind);
 
@@ -57,158 +56,225 @@ class RemoteText {
     }
   }
 
+  // A hole's function: that of each method with its index.
+  auto EachMethod(void (RemoteText::*write)(const FunctionSignature& method, size_t index)) {
+    return [this, write] {
+      for (size_t i = 0; i < m_interface.m_methods.size(); ++i) (this->*write)(m_interface.m_methods[i], i);
+    };
+  }
+
   TextWriter& m_out;
   const InterfaceDef& m_interface;
   const std::string& m_name;
-  const std::string m_count;
 };
 
-void RemoteText::WriteResultFunction(const FunctionSignature& method) {
-  m_out << "static void Result_" << method.name
-        << (m_interface.m_isRmi ? "(vesk::InputArchive& _ar, void** _p)\n" : "(vesk::Archive& _ar, void** _p)\n");
-  Block body(m_out);
-  for (const FunctionArg& arg : method.arguments) {
-    if (ComesBack(arg)) m_out << "_ar >> *(" << TypeText(WithoutLeading(arg.type, {kOpReference})) << "*) *_p++;\n";
-  }
+// --- Stub
+
+void RemoteText::WriteStub() {
+  Write(m_out, R"(
+    struct Stub$name$ : vesk::Stub
+    {
+        Stub$name$() : Stub(vesk::ptr<$name$>(this),$count$) {}
+        $methods$
+    };
+  )",
+        "name"_ = m_name, "count"_ = m_interface.m_methods.size(),
+        "methods"_ = EachMethod(&RemoteText::WriteStubMethod));
+  WriteFactory("Stub");
 }
 
 void RemoteText::WriteStubMethod(const FunctionSignature& method, size_t index) {
   const size_t results = CountResults(method);
   if (results > 0) WriteResultFunction(method);
-  m_out << "void " << method.name << "(";
-  WriteArgDeclarations(m_out, method.arguments);
-  m_out << (method.isConst ? ") const\n" : ")\n");
-  Block body(m_out);
-  if (results > 0) {
-    WriteText(m_out,
-              "vesk::QueuedResponse<$0>* qr__ = new vesk::QueuedResponse<$0>;\n"
-              "qr__->m_fn = &Result_$1;\n",
-              {std::to_string(results), method.name});
-    size_t number = 0;
-    for (const FunctionArg& arg : method.arguments) {
-      if (ComesBack(arg)) m_out << "qr__->m_outparams[" << number++ << "] = &" << arg.name << ";\n";
+  Write(
+      m_out, R"(
+    void $method$($parameters$)$const$
+    {
+        $response$
+        StubBegin($index$,$responseName$)$values$;
+        StubEnd();
     }
-  }
-  m_out << "StubBegin(" << index << "," << (results > 0 ? "qr__" : "NULL") << ")";
-  WriteOutgoing(method, " << ");
-  m_out << ";\nStubEnd();\n";
+  )",
+      "method"_ = method.name, "parameters"_ = [&] { WriteArgDeclarations(m_out, method.arguments); },
+      "const"_ = If(method.isConst, " const"), "response"_ = If(results > 0, [&] { WriteResponse(method, results); }),
+      "index"_ = index, "responseName"_ = results > 0 ? "qr__" : "NULL",
+      "values"_ = [&] { WriteOutgoing(method, " << "); });
 }
 
+void RemoteText::WriteResultFunction(const FunctionSignature& method) {
+  auto result = [&](const FunctionArg& arg) {
+    if (!ComesBack(arg)) return;
+    Write(m_out, "_ar >> *($type$*) *_p++;\n", "type"_ = WithoutLeading(arg.type, {kOpReference}));
+  };
+  Write(m_out, R"(
+    static void Result_$method$(vesk::$archive$& _ar, void** _p)
+    {
+        $results$
+    }
+  )",
+        "method"_ = method.name, "archive"_ = m_interface.m_isRmi ? "InputArchive" : "Archive",
+        "results"_ = Each(m_out, method.arguments, "", result));
+}
+
+// Tells the connection where the answer's values belong.
+void RemoteText::WriteResponse(const FunctionSignature& method, size_t results) {
+  size_t number = 0;
+  auto parameter = [&](const FunctionArg& arg) {
+    if (!ComesBack(arg)) return;
+    Write(m_out, "qr__->m_outparams[$number$] = &$name$;\n", "number"_ = number++, "name"_ = arg.name);
+  };
+  Write(m_out, R"(
+    vesk::QueuedResponse<$results$>* qr__ = new vesk::QueuedResponse<$results$>;
+    qr__->m_fn = &Result_$method$;
+    $parameters$
+  )",
+        "results"_ = results, "method"_ = method.name, "parameters"_ = Each(m_out, method.arguments, "", parameter));
+}
+
+// --- Skeleton and scion
+
+void RemoteText::WriteServer() {
+  const std::string_view kind = m_interface.m_isRmi ? "Skeleton" : "Scion";
+  auto invoke = [&] {
+    if (m_interface.m_isRmi) {
+      return Write(m_out, R"(
+        vesk::ptr<$name$> Invoke()
+        {
+            return vesk::ptr<$name$>(m_delegate.m_self, m_delegate.m_table);
+        }
+      )",
+                   "name"_ = m_name);
+    }
+    Write(m_out, R"(
+      $name$& Invoke()
+      {
+          return reinterpret_cast<$name$&>(m_delegate);
+      }
+    )",
+          "name"_ = m_name);
+  };
+  Write(
+      m_out, R"(
+    struct $kind$$name$ : vesk::$kind$
+    {
+        $kind$$name$() : vesk::$kind$(Get$kind$ThunkFnTable(),$count$) {}
+        $invoke$
+        $thunks$
+        $thunkTable$
+    };
+  )",
+      "kind"_ = kind, "name"_ = m_name, "count"_ = m_interface.m_methods.size(), "invoke"_ = invoke,
+      "thunks"_ = EachMethod(&RemoteText::WriteThunk), "thunkTable"_ = [&] { WriteThunkTable(kind); });
+  WriteFactory(kind);
+}
+
+void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
+  auto argument = [&](const FunctionArg& arg) {
+    m_out << arg.name << (arg.direction == ArgDirection::Copy ? ".release()" : "");
+  };
+  auto result = [&](const FunctionArg& arg) {
+    if (ComesBack(arg)) m_out << " << " << arg.name;
+  };
+  auto results = [&] { Write(m_out, "Push()$results$;\n", "results"_ = Each(m_out, method.arguments, "", result)); };
+  Write(
+      m_out, R"(
+    void Thunk$index$()
+    {
+        $incoming$
+        Invoke()->$method$($arguments$);
+        $results$
+    }
+  )",
+      "index"_ = index, "incoming"_ = [&] { WriteIncoming(method); }, "method"_ = method.name,
+      "arguments"_ = Each(m_out, method.arguments, ",", argument), "results"_ = If(CountResults(method) > 0, results));
+}
+
+// The parameters as variables, and the values that came with the call.
+void RemoteText::WriteIncoming(const FunctionSignature& method) {
+  if (method.arguments.empty()) {
+    m_out << "Pop();\n";
+    return;
+  }
+  auto variable = [&](const FunctionArg& arg) {
+    const TypeView type = WithoutLeading(arg.type, {kOpReference, kOpConst});
+    if (arg.direction == ArgDirection::Copy) {
+      Write(m_out, "std::auto_ptr<$type$> $name$(new $type$);\n", "type"_ = type.Inner(), "name"_ = arg.name);
+    } else {
+      Write(m_out, "$type$ $name$;\n", "type"_ = type, "name"_ = arg.name);
+    }
+  };
+  Write(
+      m_out, R"(
+    $variables$
+    auto _ar = Pop(); _ar$values$;
+  )",
+      "variables"_ = Each(m_out, method.arguments, "", variable), "values"_ = [&] { WriteOutgoing(method, " >> "); });
+}
+
+void RemoteText::WriteThunkTable(std::string_view kind) {
+  const size_t count = m_interface.m_methods.size();
+  auto functions = [&] {
+    for (size_t i = 0; i < count; ++i) {
+      Write(m_out, "static void sThunk$index$(void* _self) { (($kind$$name$*)_self)->Thunk$index$(); }\n", "index"_ = i,
+            "kind"_ = kind, "name"_ = m_name);
+    }
+  };
+  auto rows = [&] {
+    for (size_t i = 0; i < count; ++i) m_out << "&sThunk" << i << ",\n";
+  };
+  Write(m_out, R"(
+    $functions$
+    static const vesk::$kind$ThunkFn* Get$kind$ThunkFnTable()
+    {
+        static const vesk::$kind$ThunkFn t[] =
+        {
+            $rows$
+        };
+        return t;
+    }
+  )",
+        "functions"_ = functions, "kind"_ = kind, "rows"_ = rows);
+}
+
+// --- Factory of either side
+
 void RemoteText::WriteFactory(std::string_view kind) {
-  WriteText(m_out,
-            "struct $0$1Factory : public vesk::I$0Factory\n"
-            "{\n"
-            "    $0$1Factory()\n"
-            "    {\n"
-            "        vesk::Register$0(vesk::GetIpcInterfaceName<$1>(),this);\n"
-            "    }\n"
-            "    ~$0$1Factory()\n"
-            "    {\n"
-            "        vesk::Unregister$0(vesk::GetIpcInterfaceName<$1>());\n"
-            "    }\n"
-            "    virtual vesk::$0* Create$0()\n"
-            "    {\n"
-            "        return new $0$1;\n"
-            "    }\n"
-            "};\n"
-            "void _Register_$0$1()\n"
-            "{\n"
-            "    static $0$1Factory s;\n"
-            "}\n",
-            {kind, m_name});
+  Write(m_out, R"(
+    struct $kind$$name$Factory : public vesk::I$kind$Factory
+    {
+        $kind$$name$Factory()
+        {
+            vesk::Register$kind$(vesk::GetIpcInterfaceName<$name$>(),this);
+        }
+        ~$kind$$name$Factory()
+        {
+            vesk::Unregister$kind$(vesk::GetIpcInterfaceName<$name$>());
+        }
+        virtual vesk::$kind$* Create$kind$()
+        {
+            return new $kind$$name$;
+        }
+    };
+    void _Register_$kind$$name$()
+    {
+        static $kind$$name$Factory s;
+    }
+  )",
+        "kind"_ = kind, "name"_ = m_name);
   std::string scope = m_interface.parent->GetQualifiedName();
   if (!scope.empty()) scope += "::";
   m_interface.owner.registerNames.push_back(scope + std::string(kind) + m_name);
 }
 
-void RemoteText::WriteStub() {
-  WriteText(m_out, "struct Stub$0 : vesk::Stub\n{\n", {m_name});
-  {
-    IndentScope indent(m_out, 4);
-    WriteText(m_out, "Stub$0() : Stub(vesk::ptr<$0>(this),$1) {}\n", {m_name, m_count});
-    for (size_t i = 0; i < m_interface.m_methods.size(); ++i) WriteStubMethod(m_interface.m_methods[i], i);
-  }
-  m_out << "};\n";
-  WriteFactory("Stub");
-}
-
-void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
-  m_out << "void Thunk" << index << "()\n";
-  Block body(m_out);
-  if (method.arguments.empty()) {
-    m_out << "Pop();\n";
-  } else {
-    for (const FunctionArg& arg : method.arguments) {
-      const TypeView type = WithoutLeading(arg.type, {kOpReference, kOpConst});
-      if (arg.direction == ArgDirection::Copy) {
-        WriteText(m_out, "std::auto_ptr<$0> $1(new $0);\n", {TypeText(type.Inner()), arg.name});
-      } else {
-        PrintDeclaration(m_out, type, arg.name, DeclarationMode::Plain);
-        m_out << ";\n";
-      }
-    }
-    m_out << "auto _ar = Pop(); _ar";
-    WriteOutgoing(method, " >> ");
-    m_out << ";\n";
-  }
-  m_out << "Invoke()->" << method.name << "(";
-  for (const FunctionArg& arg : method.arguments) {
-    m_out << (&arg == &method.arguments.front() ? "" : ",") << arg.name
-          << (arg.direction == ArgDirection::Copy ? ".release()" : "");
-  }
-  m_out << ");\n";
-  if (CountResults(method) == 0) return;
-  m_out << "Push()";
-  for (const FunctionArg& arg : method.arguments) {
-    if (ComesBack(arg)) m_out << " << " << arg.name;
-  }
-  m_out << ";\n";
-}
-
-void RemoteText::WriteThunkTable(std::string_view kind) {
-  for (size_t i = 0; i < m_interface.m_methods.size(); ++i) {
-    WriteText(m_out, "static void sThunk$0(void* _self) { (($1$2*)_self)->Thunk$0(); }\n",
-              {std::to_string(i), kind, m_name});
-  }
-  WriteText(m_out, "static const vesk::$0ThunkFn* Get$0ThunkFnTable()\n", {kind});
-  Block body(m_out);
-  WriteText(m_out, "static const vesk::$0ThunkFn t[] =\n", {kind});
-  {
-    Block rows(m_out, ";");
-    for (size_t i = 0; i < m_interface.m_methods.size(); ++i) m_out << "&sThunk" << i << ",\n";
-  }
-  m_out << "return t;\n";
-}
-
-void RemoteText::WriteServer() {
-  const std::string_view kind = m_interface.m_isRmi ? "Skeleton" : "Scion";
-  WriteText(m_out, "struct $0$1 : vesk::$0\n{\n", {kind, m_name});
-  {
-    IndentScope indent(m_out, 4);
-    WriteText(m_out, "$0$1() : vesk::$0(Get$0ThunkFnTable(),$2) {}\n", {kind, m_name, m_count});
-    WriteText(m_out,
-              m_interface.m_isRmi ? "vesk::ptr<$0> Invoke()\n"
-                                    "{\n"
-                                    "    return vesk::ptr<$0>(m_delegate.m_self, m_delegate.m_table);\n"
-                                    "}\n"
-                                  : "$0& Invoke()\n"
-                                    "{\n"
-                                    "    return reinterpret_cast<$0&>(m_delegate);\n"
-                                    "}\n",
-              {m_name});
-    for (size_t i = 0; i < m_interface.m_methods.size(); ++i) WriteThunk(m_interface.m_methods[i], i);
-    WriteThunkTable(kind);
-  }
-  m_out << "};\n";
-  WriteFactory(kind);
-}
-
 }  // namespace
 
 void WriteRemoteInterface(TextWriter& out, const InterfaceDef& interface) {
-  out << "\n//### Registration of stub/scion of ";
-  PrintElement(out, interface);
-  out << "\n";
+  Write(
+      out, R"(
+
+    //### Registration of stub/scion of $interface$
+  )",
+      "interface"_ = [&] { PrintElement(out, interface); });
   NameSpaceFrame frame(out, interface.parent);
   RemoteText text(out, interface);
   text.WriteStub();
