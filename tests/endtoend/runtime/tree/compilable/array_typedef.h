@@ -1,0 +1,14 @@
+@import "Vesk/vxObject/IObject.h"
+
+$warning(disable: 1009)
+
+namespace array_typedef
+{
+
+
+$typedef int32 Triple[3];
+$typedef+ string8 Pair[2];
+$model Uses { Triple triple; Pair pair; int32 n; };
+$struct Holds : model { Triple triple; } { };
+
+}

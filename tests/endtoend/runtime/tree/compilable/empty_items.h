@@ -1,0 +1,12 @@
+@import "Vesk/vxObject/IObject.h"
+
+$warning(disable: 1009)
+
+namespace empty_items
+{
+
+
+$variant Command { { } stop; { int32 x; } go; *{ } boxed; void none; };
+$variant+ Shown { default 1; int32; { } stop; };
+
+}

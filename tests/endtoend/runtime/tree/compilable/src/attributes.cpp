@@ -1,0 +1,1 @@
+@import "compilable/attributes.h"
