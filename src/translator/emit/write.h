@@ -160,7 +160,7 @@ class TextPieces {
   uint64_t m_used = 0;
   std::string_view m_blanksAhead;
   size_t m_count = 0;
-  std::array<Piece, 48> m_pieces{};
+  std::array<Piece, 64> m_pieces{};
 };
 
 template <typename... Holes>
