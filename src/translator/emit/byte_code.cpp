@@ -21,15 +21,22 @@ constexpr size_t kBytesPerLine = 16;
 
 void WriteArray(TextWriter& out, std::string_view name, const std::string& bytes) {
   static constexpr char kDigits[] = "0123456789abcdef";
-  out << "static const vesk::octet_t " << name << "[] =\n";
-  Block rows(out, ";");
-  for (size_t i = 0; i < bytes.size(); ++i) {
-    const unsigned char byte = static_cast<unsigned char>(bytes[i]);
-    out << "0x" << kDigits[byte >> 4] << kDigits[byte & 15];
-    const bool isLast = i + 1 == bytes.size();
-    if (!isLast) out << ",";
-    if (isLast || i % kBytesPerLine == kBytesPerLine - 1) out << "\n";
-  }
+  auto writeRows = [&] {
+    for (size_t i = 0; i < bytes.size(); ++i) {
+      const unsigned char byte = static_cast<unsigned char>(bytes[i]);
+      out << "0x" << kDigits[byte >> 4] << kDigits[byte & 15];
+      const bool isLast = i + 1 == bytes.size();
+      if (!isLast) out << ",";
+      if (isLast || i % kBytesPerLine == kBytesPerLine - 1) out << "\n";
+    }
+  };
+  Write(out, R"(
+    static const vesk::octet_t $name$[] =
+    {
+        $rows$
+    };
+  )",
+        "name"_ = name, "rows"_ = writeRows);
 }
 
 }  // namespace
@@ -45,52 +52,70 @@ void WriteMetadataByteCode(TextWriter& out, std::string_view arrayName, StringTa
 
 void WriteStringTable(TextWriter& out, const StringTable& strings, std::string_view prefix) {
   if (strings.Empty()) return;
-  out << "static vesk::ConstStringZ " << prefix << "_stringTable[] =\n";
-  Block rows(out, ";");
-  for (const std::string& text : strings.Strings()) out << "\"" << EscapedString(text) << "\",\n";
+  auto writeRow = [&](const std::string& text) { out << '"' << EscapedString(text) << "\",\n"; };
+  Write(out, R"(
+    static vesk::ConstStringZ $prefix$_stringTable[] =
+    {
+        $rows$
+    };
+  )",
+        "prefix"_ = prefix, "rows"_ = Each(out, strings.Strings(), "", writeRow));
+}
+
+void WriteStringTableName(TextWriter& out, const StringTable& strings, std::string_view prefix) {
+  if (strings.Empty()) {
+    out << "0";
+  } else {
+    out << prefix << "_stringTable";
+  }
 }
 
 void WriteTypeOps(TextWriter& out, std::string_view type, uint32_t bits) {
-  struct Line {
+  struct Row {
     uint32_t bit;
-    std::string_view text;  // $0 is the type
+    EmittedText<Hole<"type", std::string_view>> text;
   };
-  static constexpr Line kLines[] = {
-      {kOpsEqual, "(vesk::CompareVariableFn) (bool (*)($0 const*, $0 const*)) vesk::VariableEqual<$0>"},
-      {kOpsLess, "(vesk::CompareVariableFn) (bool (*)($0 const*, $0 const*)) vesk::VariableLess<$0>"},
-      {kOpsPrint, "(vesk::PrintVariableFn) (void (*)(vesk::xostream&, $0 const*)) vesk::PrintVariable<$0>"},
+  static constexpr Row kRows[] = {
+      {kOpsEqual, "(vesk::CompareVariableFn) (bool (*)($type$ const*, $type$ const*)) vesk::VariableEqual<$type$>"},
+      {kOpsLess, "(vesk::CompareVariableFn) (bool (*)($type$ const*, $type$ const*)) vesk::VariableLess<$type$>"},
+      {kOpsPrint, "(vesk::PrintVariableFn) (void (*)(vesk::xostream&, $type$ const*)) vesk::PrintVariable<$type$>"},
       {kOpsConstruct,
-       "(vesk::ConstructArrayFn) (void (*)( $0*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<$0>"},
+       "(vesk::ConstructArrayFn) (void (*)( $type$*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<$type$>"},
       {kOpsCopy,
-       "(vesk::CopyConstructArrayFn) (void (*)($0*, vesk::ssize_t, $0 const*, vesk::ssize_t, vesk::ssize_t)) "
-       "vesk::CopyConstructArray<$0>"},
+       "(vesk::CopyConstructArrayFn) (void (*)($type$*, vesk::ssize_t, $type$ const*, vesk::ssize_t, vesk::ssize_t)) "
+       "vesk::CopyConstructArray<$type$>"},
       {kOpsCopy,
-       "(vesk::AssignArrayFn) (void (*)($0*, vesk::ssize_t, $0 const*, vesk::ssize_t, vesk::ssize_t)) "
-       "vesk::AssignArray<$0>"},
-      {kOpsDestruct, "(vesk::DestructArrayFn) (void (*)( $0*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<$0>"},
+       "(vesk::AssignArrayFn) (void (*)($type$*, vesk::ssize_t, $type$ const*, vesk::ssize_t, vesk::ssize_t)) "
+       "vesk::AssignArray<$type$>"},
+      {kOpsDestruct,
+       "(vesk::DestructArrayFn) (void (*)( $type$*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<$type$>"},
       {kOpsSerialise,
-       "(vesk::SerialiseArrayFn) (void (*)(vesk::Archive&, $0 const*, vesk::ssize_t, vesk::ssize_t)) "
-       "vesk::SerialiseArray<$0>"},
+       "(vesk::SerialiseArrayFn) (void (*)(vesk::Archive&, $type$ const*, vesk::ssize_t, vesk::ssize_t)) "
+       "vesk::SerialiseArray<$type$>"},
       {kOpsSerialise,
-       "(vesk::DeserialiseArrayFn) (void (*)(vesk::InputArchive&, $0*, vesk::ssize_t, vesk::ssize_t)) "
-       "vesk::DeserialiseArray<$0>"},
+       "(vesk::DeserialiseArrayFn) (void (*)(vesk::InputArchive&, $type$*, vesk::ssize_t, vesk::ssize_t)) "
+       "vesk::DeserialiseArray<$type$>"},
       {kOpsVisitObjects,
-       "(vesk::VisitObjectsInArrayFn) (void (*)(vesk::IObjectVisitor&, $0 const*, vesk::ssize_t, vesk::ssize_t)) "
-       "vesk::VisitObjectsInArray<$0>"},
+       "(vesk::VisitObjectsInArrayFn) (void (*)(vesk::IObjectVisitor&, $type$ const*, vesk::ssize_t, vesk::ssize_t)) "
+       "vesk::VisitObjectsInArray<$type$>"},
       {kOpsVisitPrefs,
-       "(vesk::VisitPrefsInArrayFn) (void (*)(vesk::IPrefVisitor&, $0 const*, vesk::ssize_t, vesk::ssize_t)) "
-       "vesk::VisitPrefsInArray<$0>"},
+       "(vesk::VisitPrefsInArrayFn) (void (*)(vesk::IPrefVisitor&, $type$ const*, vesk::ssize_t, vesk::ssize_t)) "
+       "vesk::VisitPrefsInArray<$type$>"},
       {kOpsLess,
-       "(vesk::FindInArrayFn) (vesk::ssize_t (*)($0 const*, vesk::ssize_t, vesk::ssize_t, $0 const*)) "
-       "vesk::BinaryLowerBound<$0>"},
+       "(vesk::FindInArrayFn) (vesk::ssize_t (*)($type$ const*, vesk::ssize_t, vesk::ssize_t, $type$ const*)) "
+       "vesk::BinaryLowerBound<$type$>"},
       {kOpsLess,
-       "(vesk::FindInArrayFn) (vesk::ssize_t (*)($0 const*, vesk::ssize_t, vesk::ssize_t, $0 const*)) "
-       "vesk::BinaryUpperBound<$0>"},
+       "(vesk::FindInArrayFn) (vesk::ssize_t (*)($type$ const*, vesk::ssize_t, vesk::ssize_t, $type$ const*)) "
+       "vesk::BinaryUpperBound<$type$>"},
   };
   out << "sizeof(" << type << "),\n";
-  for (const Line& line : kLines) {
-    WriteText(out, bits & line.bit ? line.text : "0", {type});
-    out << (&line == std::end(kLines) - 1 ? "\n" : ",\n");
+  for (const Row& row : kRows) {
+    if (bits & row.bit) {
+      Write(out, row.text, "type"_ = type);
+    } else {
+      out << "0";
+    }
+    out << (&row == std::end(kRows) - 1 ? "\n" : ",\n");
   }
 }
 

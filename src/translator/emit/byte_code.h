@@ -25,7 +25,8 @@ class StringTable {
 void WriteTypeByteCode(TextWriter& out, std::string_view arrayName, StringTable& strings, std::string_view typeCode);
 void WriteMetadataByteCode(TextWriter& out, std::string_view arrayName, StringTable& strings,
                            std::string_view metadata);
-void WriteStringTable(TextWriter& out, const StringTable& strings, std::string_view prefix);  // nothing when empty
+void WriteStringTable(TextWriter& out, const StringTable& strings, std::string_view prefix);      // nothing when empty
+void WriteStringTableName(TextWriter& out, const StringTable& strings, std::string_view prefix);  // or "0"
 
 enum TypeOpsBits : uint32_t {
   kOpsEqual = 1,

@@ -7,7 +7,7 @@
 namespace qrex {
 
 void WriteIndentedText(TextWriter& out, std::string_view text, size_t blanks) {
-  for (size_t lineFeed; (lineFeed = text.find('\n')) != std::string_view::npos && lineFeed + 1 < text.size();
+  for (size_t lineFeed; blanks > 0 && (lineFeed = text.find('\n')) != std::string_view::npos;
        text.remove_prefix(lineFeed + 1)) {
     out << text.substr(0, lineFeed + 1) << kBlanks.substr(0, blanks);
   }
@@ -71,14 +71,14 @@ void WriteReturn(TextWriter& out, const TypeCode& returnType) {
 }
 
 void WriteSignature(TextWriter& out, const FunctionSignature& signature) {
-  if (signature.isInline) out << "inline ";
-  PrintType(out, signature.returnType);
-  out << " " << signature.name << "(";
-  WriteJoined(out, signature.arguments, ",", [&](const FunctionArg& argument) {
+  auto writeArgument = [&](const FunctionArg& argument) {
     PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
     if (!argument.defaultValue.empty()) out << "=" << argument.defaultValue;
-  });
-  out << (signature.isConst ? ") const" : ")");
+  };
+  Write(out, "$inline$$result$ $name$($arguments$)$const$", "inline"_ = signature.isInline ? "inline " : "",
+        "result"_ = TypeView(signature.returnType), "name"_ = signature.name,
+        "arguments"_ = Each(out, signature.arguments, ",", writeArgument),
+        "const"_ = signature.isConst ? " const" : "");
 }
 
 std::string NameOrZero(bool present, const std::string& name) { return present ? name : "0"; }

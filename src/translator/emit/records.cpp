@@ -5,22 +5,29 @@
 namespace qrex {
 
 void WriteReflectionHead(TextWriter& out, const NameSpaceElement& element) {
-  out << "\n//### ";
-  PrintElement(out, element);
-  out << "\n";
-  out << "namespace vesk { XTarget* " << TargetIdentifier(element) << "_GetXTarget(); }\n";
+  Write(
+      out, R"(
+
+    //### $element$
+    namespace vesk { XTarget* $target$_GetXTarget(); }
+  )",
+      "element"_ = [&] { PrintElement(out, element); }, "target"_ = TargetIdentifier(element));
 }
 
 void WriteRegistration(TextWriter& out, const NameSpaceElement& element, RegistrationLists& lists) {
   if (!element.m_registered) return;
   lists.registerNames.push_back(element.GetQualifiedName());
-  out << "\n// Registration of ";
-  PrintElement(out, element);
-  out << "\n";
-  out << "void _Register_" << element.name << "()\n";
-  Block body(out);
-  out << "vxVerify(vesk::RegisterReflected" << element.GetReflectedKindName() << "(&_GetReflected( (" << element.name
-      << "*) 0),vesk::" << TargetIdentifier(element) << "_GetXTarget()) == vesk::NSE_OK);\n";
+  Write(
+      out, R"(
+
+    // Registration of $element$
+    void _Register_$name$()
+    {
+        vxVerify(vesk::RegisterReflected$kind$(&_GetReflected( ($name$*) 0),vesk::$target$_GetXTarget()) == vesk::NSE_OK);
+    }
+  )",
+      "element"_ = [&] { PrintElement(out, element); }, "name"_ = element.name,
+      "kind"_ = element.GetReflectedKindName(), "target"_ = TargetIdentifier(element));
 }
 
 void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const FunctionSignature& signature,
@@ -31,21 +38,37 @@ void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const Func
     WriteTypeByteCode(out, prefix + std::string(infix) + argument.name, strings, argument.type);
   }
   if (signature.arguments.empty()) return;
-  out << "static const vesk::ReflectedArg " << prefix << "_args[] =\n";
-  Block rows(out, ";");
-  for (const FunctionArg& argument : signature.arguments) {
-    WriteText(out, "{ \"$2\", $0$1$2 },\n", {prefix, infix, argument.name});
-  }
+  auto writeRow = [&](const FunctionArg& argument) {
+    Write(out, R"(
+      { "$argument$", $prefix$$infix$$argument$ },
+    )",
+          "argument"_ = argument.name, "prefix"_ = prefix, "infix"_ = infix);
+  };
+  Write(out, R"(
+    static const vesk::ReflectedArg $prefix$_args[] =
+    {
+        $rows$
+    };
+  )",
+        "prefix"_ = prefix, "rows"_ = Each(out, signature.arguments, "", writeRow));
 }
 
 void WriteSignatureRows(TextWriter& out, const NameSpaceElement& element, const FunctionSignature& signature,
                         const StringTable& strings) {
   const std::string& name = element.name;
-  out << "\"" << element.GetQualifiedName() << "\",\n";
-  out << "{" << NameOrZero(!IsVoid(signature.returnType), name + "_return") << "},\n";
-  out << CountedName(signature.arguments.size(), name + "_args") << ",\n";
-  out << NameOrZero(!element.metadata.empty(), name + "_metadata") << ",\n";
-  out << NameOrZero(!strings.Empty(), name + "_stringTable") << ",\n";
+  Write(
+      out, R"(
+    "$qualifiedName$",
+    {$return$},
+    $arguments$,
+    $metadata$,
+    $strings$,
+  )",
+      "qualifiedName"_ = element.GetQualifiedName(),
+      "return"_ = NameOrZero(!IsVoid(signature.returnType), name + "_return"),
+      "arguments"_ = CountedName(signature.arguments.size(), name + "_args"),
+      "metadata"_ = NameOrZero(!element.metadata.empty(), name + "_metadata"),
+      "strings"_ = [&] { WriteStringTableName(out, strings, name); });
 }
 
 void RecordedElement::WriteReflection(TextWriter& out, RegistrationLists& lists) {
@@ -59,21 +82,32 @@ void RecordedElement::WriteReflection(TextWriter& out, RegistrationLists& lists)
 
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element) {
   const std::vector<const NameSpace*> path = EnclosingNameSpaces(element.parent);
-  out << "\n";
-  for (auto it = path.rbegin(); it != path.rend(); ++it) out << "} //" << (*it)->name << "\n";
-  out << "namespace vesk\n{\n";
-  out << "template<> struct TypeTraits<" << element.GetQualifiedName() << ">\n";
-  {
-    Block traits(out, ";");
-    out << "static const bool is_exported = " << BitText(element.m_exported) << ";\n";
-    out << "static const bool is_reflected = " << BitText(element.m_reflected) << ";\n";
-    out << "static const bool is_registered = " << BitText(element.EffectivelyRegistered()) << ";\n";
-    out << "static const vesk::ETypeTraitKind kind = vesk::" << element.kindTraits.traits << ";\n";
-    out << "static const bool has_metadata = " << BitText(element.ContainsMetaData()) << ";\n";
-  }
-  element.WriteExtraTraits(out);
-  out << "} // namespace vesk\n";
-  for (const NameSpace* nameSpace : path) out << "namespace " << nameSpace->name << "\n{\n";
+  auto writeEnds = [&] {
+    for (auto it = path.rbegin(); it != path.rend(); ++it) out << "} //" << (*it)->name << "\n";
+  };
+  auto writeBegin = [&](const NameSpace* nameSpace) { out << "namespace " << nameSpace->name << "\n{\n"; };
+  Write(
+      out, R"(
+
+    $ends$
+    namespace vesk
+    {
+    template<> struct TypeTraits<$name$>
+    {
+        static const bool is_exported = $exported$;
+        static const bool is_reflected = $reflected$;
+        static const bool is_registered = $registered$;
+        static const vesk::ETypeTraitKind kind = vesk::$kind$;
+        static const bool has_metadata = $metadata$;
+    };
+    $extraTraits$
+    } // namespace vesk
+    $begins$
+  )",
+      "ends"_ = writeEnds, "name"_ = element.GetQualifiedName(), "exported"_ = BitText(element.m_exported),
+      "reflected"_ = BitText(element.m_reflected), "registered"_ = BitText(element.EffectivelyRegistered()),
+      "kind"_ = element.kindTraits.traits, "metadata"_ = BitText(element.ContainsMetaData()),
+      "extraTraits"_ = [&] { element.WriteExtraTraits(out); }, "begins"_ = Each(out, path, "", writeBegin));
 }
 
 }  // namespace qrex

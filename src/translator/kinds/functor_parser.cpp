@@ -94,44 +94,48 @@ class MakeFunctor {
 
   const FunctionSignature& Signature() const { return m_functor->signature; }
 
-  void WriteStaticDelegate() {
-    m_out << "static ";
-    WriteSelfSignature(m_out, Signature(), "__stdcall static_delegate");
-    m_out << "\n";
-  }
+  void WriteDelegate() { WriteSelfSignature(m_out, Signature(), "__stdcall static_delegate"); }
+  void WriteBody() { m_out << m_body << "\n"; }
 
   void WritePlain() {
-    m_out << "struct " << m_name << "_delegator\n";
-    {
-      Block body(m_out, ";");
-      WriteStaticDelegate();
-      Block code(m_out);
-      m_out << m_body << "\n";
-    }
-    WriteText(m_out, "\n$0 $1(NULL,$1_delegator::static_delegate);", {m_functor->GetQualifiedName(), m_name});
+    Write(
+        m_out, R"(
+      struct $name$_delegator
+      {
+          static $delegate$
+          {
+              $body$
+          }
+      };
+
+      $functor$ $name$(NULL,$name$_delegator::static_delegate);)",
+        "name"_ = m_name, "delegate"_ = [&] { WriteDelegate(); }, "body"_ = [&] { WriteBody(); },
+        "functor"_ = m_functor->GetQualifiedName());
   }
 
   void WriteBound() {
-    m_out << "struct " << m_name << "_delegator : public " << m_base << "\n";
-    {
-      Block body(m_out, ";");
-      PrintType(m_out, Signature().returnType);
-      m_out << " member_delegate(";
-      WriteArgDeclarations(m_out, Signature().arguments);
-      m_out << ")" << (Signature().isConst ? " const" : "") << (m_isConst ? " const" : "") << "\n";
+    Write(
+        m_out, R"(
+      struct $name$_delegator : public $base$
       {
-        Block code(m_out);
-        m_out << m_body << "\n";
-      }
-      WriteStaticDelegate();
-      Block code(m_out);
-      WriteReturn(m_out, Signature().returnType);
-      m_out << "static_cast<" << m_name << "_delegator*>(_self)->member_delegate(";
-      WriteArgNames(m_out, Signature().arguments);
-      m_out << ");\n";
-    }
-    const std::string object = m_isConst ? "const_cast<" + m_base + "*>(" + m_object + ")" : m_object;
-    WriteText(m_out, "\n$0 $1($2,$1_delegator::static_delegate);", {m_functor->GetQualifiedName(), m_name, object});
+          $result$ member_delegate($parameters$)$methodConst$$const$
+          {
+              $body$
+          }
+          static $delegate$
+          {
+              $return$static_cast<$name$_delegator*>(_self)->member_delegate($arguments$);
+          }
+      };
+
+      $functor$ $name$($object$,$name$_delegator::static_delegate);)",
+        "name"_ = m_name, "base"_ = m_base, "result"_ = TypeView(Signature().returnType),
+        "parameters"_ = [&] { WriteArgDeclarations(m_out, Signature().arguments); },
+        "methodConst"_ = Signature().isConst ? " const" : "", "const"_ = m_isConst ? " const" : "",
+        "body"_ = [&] { WriteBody(); }, "delegate"_ = [&] { WriteDelegate(); },
+        "return"_ = [&] { WriteReturn(m_out, Signature().returnType); },
+        "arguments"_ = [&] { WriteArgNames(m_out, Signature().arguments); }, "functor"_ = m_functor->GetQualifiedName(),
+        "object"_ = m_isConst ? "const_cast<" + m_base + "*>(" + m_object + ")" : m_object);
   }
 
   QrexParser& m_parser;

@@ -18,16 +18,47 @@ void GlobalDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   NameSpaceFrame frame(out, parent);
   IndentScope indent(out, 4);
   lists.registerNames.push_back(GetQualifiedName());
-  out << "void _Register_" << name << "()\n";
-  Block body(out);
-  WriteReflectedDefinition(out);
+  Write(
+      out, R"(
+    void _Register_$name$()
+    {
+        $definition$
+    }
+  )",
+      "name"_ = name, "definition"_ = [&] { WriteReflectedDefinition(out); });
 }
 
 namespace {
 
-void WriteRegister(TextWriter& out, const NameSpaceElement& element, std::string_view suffix) {
-  out << "vxVerify(vesk::RegisterReflected" << element.GetReflectedKindName() << "(&" << element.name << suffix
-      << ",vesk::" << TargetIdentifier(element) << "_GetXTarget()) == vesk::NSE_OK);\n";
+// `record`: the static object that the definition has written.
+void WriteRegister(TextWriter& out, const NameSpaceElement& element, std::string_view record) {
+  Write(out, R"(
+    vxVerify(vesk::RegisterReflected$kind$(&$record$,vesk::$target$_GetXTarget()) == vesk::NSE_OK);
+  )",
+        "kind"_ = element.GetReflectedKindName(), "record"_ = record, "target"_ = TargetIdentifier(element));
+}
+
+// Of what has a type. `address`: the row of what has one.
+void WriteTypedDefinition(TextWriter& out, const NameSpaceElement& element, const TypeCode& type,
+                          std::string_view record, std::string_view address) {
+  const std::string& name = element.name;
+  StringTable strings;
+  WriteTypeByteCode(out, name + "_type", strings, type);
+  WriteStringTable(out, strings, name);
+  Write(
+      out, R"(
+    static const vesk::Reflected$kind$ $record$ =
+    {
+        "$qualifiedName$",
+        $address$
+        $name$_type,
+        $strings$
+    };
+    $register$
+  )",
+      "kind"_ = element.GetReflectedKindName(), "record"_ = record, "qualifiedName"_ = element.GetQualifiedName(),
+      "address"_ = address, "name"_ = name, "strings"_ = NameOrZero(!strings.Empty(), name + "_stringTable"),
+      "register"_ = [&] { WriteRegister(out, element, record); });
 }
 
 }  // namespace
@@ -36,43 +67,28 @@ void GlobalFunctionDef::WriteReflectedDefinition(TextWriter& out) {
   StringTable strings;
   WriteSignatureArrays(out, name, signature, strings, "_arg_");
   WriteStringTable(out, strings, name);
-  out << "static const vesk::ReflectedGlobalFunction " << name << "_function =\n";
-  {
-    Block record(out, ";");
-    WriteSignatureRows(out, *this, signature, strings);
-    out << "(vesk::FunctionPointer)(";
-    PrintType(out, signature.returnType);
-    out << " (*)(";
-    WriteArgDeclarations(out, signature.arguments);
-    out << ")" << (signature.isConst ? " const" : "") << ")&" << GetQualifiedName() << "\n";
-  }
-  WriteRegister(out, *this, "_function");
+  Write(
+      out, R"(
+    static const vesk::ReflectedGlobalFunction $name$_function =
+    {
+        $rows$
+        (vesk::FunctionPointer)($result$ (*)($arguments$)$const$)&$qualifiedName$
+    };
+    $register$
+  )",
+      "name"_ = name, "rows"_ = [&] { WriteSignatureRows(out, *this, signature, strings); },
+      "result"_ = TypeView(signature.returnType),
+      "arguments"_ = [&] { WriteArgDeclarations(out, signature.arguments); },
+      "const"_ = signature.isConst ? " const" : "", "qualifiedName"_ = GetQualifiedName(),
+      "register"_ = [&] { WriteRegister(out, *this, name + "_function"); });
 }
 
 void GlobalVarDef::WriteReflectedDefinition(TextWriter& out) {
-  StringTable strings;
-  WriteTypeByteCode(out, name + "_type", strings, type);
-  WriteStringTable(out, strings, name);
-  out << "static const vesk::ReflectedGlobalVariable " << name << "_var =\n";
-  {
-    Block record(out, ";");
-    out << "\"" << GetQualifiedName() << "\",\n&" << name << ",\n" << name << "_type,\n";
-    out << NameOrZero(!strings.Empty(), name + "_stringTable") << "\n";
-  }
-  WriteRegister(out, *this, "_var");
+  WriteTypedDefinition(out, *this, type, name + "_var", "&" + name + ",");
 }
 
 void TypedefDef::WriteReflectedDefinition(TextWriter& out) {
-  StringTable strings;
-  WriteTypeByteCode(out, name + "_type", strings, type);
-  WriteStringTable(out, strings, name);
-  out << "static const vesk::ReflectedTypedef " << name << "_typedef =\n";
-  {
-    Block record(out, ";");
-    out << "\"" << GetQualifiedName() << "\",\n" << name << "_type,\n";
-    out << NameOrZero(!strings.Empty(), name + "_stringTable") << "\n";
-  }
-  WriteRegister(out, *this, "_typedef");
+  WriteTypedDefinition(out, *this, type, name + "_typedef", "");
 }
 
 }  // namespace qrex

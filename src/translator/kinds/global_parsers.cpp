@@ -211,11 +211,14 @@ void ParseTypedef(QrexParser& parser) {
   parser.DropTo(declaration.parsed.nameEnd);
   parser.CheckMetadata(def);
   CopyToSemicolon(parser, "Missing semicolon after typedef " + declaration.parsed.name, declaration.begin);
-  parser.out << "\ninline vesk::ConstStringZ GetTypedefName_" << def.name << "()\n";
-  {
-    Block body(parser.out);
-    parser.out << "return \"" << def.GetQualifiedName() << "\";\n";
-  }
+  Write(parser.out, R"(
+
+    inline vesk::ConstStringZ GetTypedefName_$name$()
+    {
+        return "$qualifiedName$";
+    }
+  )",
+        "name"_ = def.name, "qualifiedName"_ = def.GetQualifiedName());
   parser.Flush();
 }
 

@@ -38,7 +38,7 @@ class Dispatch {
     }
   }
 
-  void Write() {
+  void WriteAll() {
     Block body(m_out);
     if (!m_levels.empty()) WriteLevel(0);
   }
@@ -60,17 +60,25 @@ class Dispatch {
   void WriteLevel(size_t depth) {
     Level& level = m_levels[depth];
     const bool isLast = depth + 1 == m_levels.size();
-    IndentScope indent(m_out, 4);
-    m_out << "switch(" << level.argument->name << ".GetTag())\n{\n";
-    for (level.item = 0; level.item < level.variant->m_items.size(); ++level.item) {
-      m_out << "case " << level.item << (isLast ? " : " : " :\n");
-      if (isLast) {
-        WriteCall();
-      } else {
-        WriteLevel(depth + 1);
+    auto writeCases = [&] {
+      for (level.item = 0; level.item < level.variant->m_items.size(); ++level.item) {
+        m_out << "case " << level.item << (isLast ? " : " : " :\n");
+        if (isLast) {
+          WriteCall();
+        } else {
+          WriteLevel(depth + 1);
+        }
       }
-    }
-    m_out << "default: vxAssertUnreachable();\n}\n";
+    };
+    const IndentScope indent(m_out, 4);
+    Write(m_out, R"(
+      switch($argument$.GetTag())
+      {
+      $cases$
+      default: vxAssertUnreachable();
+      }
+    )",
+          "argument"_ = level.argument->name, "cases"_ = writeCases);
   }
 
   // Of the overload for the current item of each level.
@@ -95,6 +103,6 @@ class Dispatch {
 
 }  // namespace
 
-void WriteDispatchBody(QrexParser& parser, const GlobalFunctionDef& def) { Dispatch(parser, def).Write(); }
+void WriteDispatchBody(QrexParser& parser, const GlobalFunctionDef& def) { Dispatch(parser, def).WriteAll(); }
 
 }  // namespace qrex

@@ -28,8 +28,11 @@ void ParseType(QrexParser& parser) {
   const std::string api =
       registered && project.targetType == TargetType::DynamicLinkLibrary ? project.name + "_API " : std::string();
   if (registered) parser.file.typeRegistrations.push_back({parsed->type, &parser.Current()});
-  parser.out << api << "vesk::ReflectionByteCode _GetReflected(" << type << " const*);\n";
-  parser.out << api << "vesk::TypeOps const& _GetTypeOps(" << type << " const*);\n";
+  Write(parser.out, R"(
+    $api$vesk::ReflectionByteCode _GetReflected($type$ const*);
+    $api$vesk::TypeOps const& _GetTypeOps($type$ const*);
+  )",
+        "api"_ = api, "type"_ = type);
   parser.Flush();
   parser.DropBehindCurrent();
   if (!parser.Is(kSemicolon)) {
@@ -45,28 +48,32 @@ void WriteTypeRegistration(TextWriter& out, const TypeRegistration& registration
   lists.registerNames.push_back(name + mangled);
 
   NameSpaceFrame frame(out, registration.scope);
-  out << "vesk::ReflectionByteCode _GetReflected(" << type << " const*)\n";
-  {
-    Block body(out);
-    StringTable strings;
-    WriteTypeByteCode(out, "bc", strings, registration.code);
-    WriteStringTable(out, strings, "");
-    out << "return vesk::ReflectionByteCode(bc," << (strings.Empty() ? "NULL" : "_stringTable") << ");\n";
-  }
-  out << "vesk::TypeOps const& _GetTypeOps(" << type << " const*)\n";
-  {
-    Block body(out);
-    out << "static vesk::TypeOps typeOps =\n";
+  StringTable strings;
+  Write(
+      out, R"(
+    vesk::ReflectionByteCode _GetReflected($type$ const*)
     {
-      Block record(out, ";");
-      WriteTypeOps(out, type, kOpsAll);
+        $byteCode$
+        $strings$
+        return vesk::ReflectionByteCode(bc,$stringsName$);
     }
-    out << "return typeOps;\n";
-  }
-  out << "void _Register_" << mangled << "()\n";
-  Block body(out);
-  out << "vxVerify(vesk::RegisterTypeOps(vesk::ReflectionByteCodeValue(_GetReflected((" << type
-      << "*)0)),&_GetTypeOps((" << type << "*)0)));\n";
+    vesk::TypeOps const& _GetTypeOps($type$ const*)
+    {
+        static vesk::TypeOps typeOps =
+        {
+            $typeOps$
+        };
+        return typeOps;
+    }
+    void _Register_$mangled$()
+    {
+        vxVerify(vesk::RegisterTypeOps(vesk::ReflectionByteCodeValue(_GetReflected(($type$*)0)),&_GetTypeOps(($type$*)0)));
+    }
+  )",
+      "type"_ = type, "byteCode"_ = [&] { WriteTypeByteCode(out, "bc", strings, registration.code); },
+      "strings"_ = [&] { WriteStringTable(out, strings, ""); },
+      "stringsName"_ = [&] { out << (strings.Empty() ? "NULL" : "_stringTable"); },
+      "typeOps"_ = [&] { WriteTypeOps(out, type, kOpsAll); }, "mangled"_ = mangled);
 }
 
 }  // namespace qrex

@@ -74,11 +74,13 @@ void VariantStatement::ReadDefault() {
   }
   LexScanner expression(TextRange(begin, m_parser.current.text.begin));
   SkipWhiteSpace(expression);
-  m_parser.out << m_def->name << "()\n";
-  {
-    Block body(m_parser.out);
-    m_parser.out << "new (this) " << m_def->name << "(" << expression.View() << ");\n";
-  }
+  Write(m_parser.out, R"(
+    $name$()
+    {
+        new (this) $name$($value$);
+    }
+  )",
+        "name"_ = m_def->name, "value"_ = expression.View());
   m_def->m_hasDefault = true;
   m_parser.Advance();
 }

@@ -56,19 +56,21 @@ const ClassDef* ModelOfType(TypeView type, NameSpace& root) {
 void AttributeWriter::WriteStruct(const std::string& className, TypeView type, const std::string& attributeName,
                                   const std::string& accessorName, const std::string& memberName, bool readOnly) {
   const std::string arguments = "(" + className + "," + attributeName + ")";
-  m_out << "struct\n{\n";
-  {
-    IndentScope indent(m_out, 4);
-    WriteOperators({.className = className,
+  const Scope scope{.className = className,
                     .self = "ATTRIB_CAST" + arguments,
                     .constSelf = "CONST_ATTRIB_CAST" + arguments,
                     .attribute = attributeName,
                     .accessor = accessorName,
                     .member = memberName,
-                    .readOnly = readOnly},
-                   type);
-  }
-  m_out << "} " << memberName << ";\n";
+                    .readOnly = readOnly};
+  Write(
+      m_out, R"(
+    struct
+    {
+        $operators$
+    } $member$;
+  )",
+      "operators"_ = [&] { WriteOperators(scope, type); }, "member"_ = memberName);
 }
 
 void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
@@ -99,101 +101,139 @@ void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
   }
 }
 
-void AttributeWriter::WriteConversions(const Scope& scope, std::string_view typeText, bool isOffsettable) {
+void AttributeWriter::WriteConversions(const Scope& scope, std::string_view type, bool isOffsettable) {
   const std::string key = scope.Key();
-  WriteText(
-      m_out, "operator $0$1() const { return $2->Get$3($4); }\n",
-      {typeText, m_access == Access::Methods || isOffsettable ? "" : " const&", scope.constSelf, scope.accessor, key});
-  if (m_access == Access::Methods) return;
-  WriteText(m_out, "$0 const& read() const { return $1->Get$2($3); }\n",
-            {typeText, scope.constSelf, scope.accessor, key});
-  if (m_access == Access::Barriers) {
-    WriteText(m_out, "$0 & write() { return $1->Write$2($3); }\n", {typeText, scope.self, scope.accessor, key});
-  }
-  WriteText(m_out,
-            "$0 const& model() const { return $1->_model__$3($4); }\n"
-            "$0& model() { return $2->_model__$3($4); }\n"
-            "vesk::Path path() const { return $1->Get$3Path($4); }\n",
-            {typeText, scope.constSelf, scope.self, scope.accessor, key});
+  const bool isMethods = m_access == Access::Methods;
+  Write(m_out, "operator $type$$reference$() const { return $self$->Get$field$($key$); }\n", "type"_ = type,
+        "reference"_ = isMethods || isOffsettable ? "" : " const&", "self"_ = scope.constSelf,
+        "field"_ = scope.accessor, "key"_ = key);
+  if (isMethods) return;
+  auto write = [&] {
+    if (m_access != Access::Barriers) return;
+    Write(m_out, "$type$ & write() { return $self$->Write$field$($key$); }\n", "type"_ = type, "self"_ = scope.self,
+          "field"_ = scope.accessor, "key"_ = key);
+  };
+  Write(m_out, R"(
+    $type$ const& read() const { return $constSelf$->Get$field$($key$); }
+    $write$
+    $type$ const& model() const { return $constSelf$->_model__$field$($key$); }
+    $type$& model() { return $self$->_model__$field$($key$); }
+    vesk::Path path() const { return $constSelf$->Get$field$Path($key$); }
+  )",
+        "type"_ = type, "self"_ = scope.self, "constSelf"_ = scope.constSelf, "field"_ = scope.accessor, "key"_ = key,
+        "write"_ = write);
 }
 
 void AttributeWriter::WriteModel(const Scope& scope, const ClassDef& model) {
-  m_out << "union\n";
-  Block body(m_out, ";");
-  for (const ModelField* field : model.m_modelFields) {
-    if (field->IsDropped()) continue;
-    const std::string attribute = scope.attribute.empty() ? field->m_name : scope.attribute + "." + field->m_name;
-    WriteStruct(scope.className, field->m_type, attribute, scope.accessor + field->m_name, field->m_name,
-                scope.readOnly);
-  }
+  auto writeFields = [&] {
+    for (const ModelField* field : model.m_modelFields) {
+      if (field->IsDropped()) continue;
+      const std::string attribute = scope.attribute.empty() ? field->m_name : scope.attribute + "." + field->m_name;
+      WriteStruct(scope.className, field->m_type, attribute, scope.accessor + field->m_name, field->m_name,
+                  scope.readOnly);
+    }
+  };
+  Write(m_out, R"(
+    union
+    {
+        $fields$
+    };
+  )",
+        "fields"_ = writeFields);
 }
 
 void AttributeWriter::WriteOffset(const Scope& scope, TypeView type, TypeOp op) {
   if (scope.readOnly) return;
-  WriteText(m_out,
-            "void operator+=($0) { $1->Offset$2($3$4); }\n"
-            "void operator-=($0) { $1->Offset$2($3-$5$4); }\n",
-            {ConstReferenceText(type, scope.member), scope.self, scope.accessor, WithComma(scope.Key()), scope.member,
-             NegationCast(op)});
+  Write(m_out, R"(
+    void operator+=($argument$) { $self$->Offset$field$($key$$name$); }
+    void operator-=($argument$) { $self$->Offset$field$($key$-$cast$$name$); }
+  )",
+        "argument"_ = ConstReferenceText(type, scope.member), "self"_ = scope.self, "field"_ = scope.accessor,
+        "key"_ = WithComma(scope.Key()), "cast"_ = NegationCast(op), "name"_ = scope.member);
 }
 
 void AttributeWriter::WritePlain(const Scope& scope, TypeView type, TypeView inner) {
-  const std::string typeText = TypeText(type);
   const std::string get = scope.constSelf + "->Get" + scope.accessor + "(" + scope.Key() + ")";
   const TypeOp op = inner.Op();
   if (op == kOpPointer || op == kOpPtr || op == kOpPref || op == kOpCref) {
-    WriteText(m_out, "$0 operator->() const { return $1; }\n", {typeText, get});
+    Write(m_out, "$type$ operator->() const { return $get$; }\n", "type"_ = type, "get"_ = get);
   }
   if (op == kOpPref) {
-    WriteText(m_out,
-              "$0 operator*() const { return *$1; }\n"
-              "vesk::ptr<$0 > Get() const { return $1.Get(); }\n",
-              {TypeText(inner.Inner()), get});
+    Write(m_out, R"(
+      $object$ operator*() const { return *$get$; }
+      vesk::ptr<$object$ > Get() const { return $get$.Get(); }
+    )",
+          "object"_ = inner.Inner(), "get"_ = get);
   }
   if (op == kOpCref) {
-    WriteText(m_out,
-              "$0& operator*() const { return *$1; }\n"
-              "$0* Get() const { return $1.Get(); }\n",
-              {TypeText(inner.Inner()), get});
+    Write(m_out, R"(
+      $object$& operator*() const { return *$get$; }
+      $object$* Get() const { return $get$.Get(); }
+    )",
+          "object"_ = inner.Inner(), "get"_ = get);
   }
   if (scope.readOnly) return;
-  WriteText(m_out, "void operator=($0) { $1->Set$2($3_v); }\n",
-            {ConstReferenceText(type, "_v"), scope.self, scope.accessor, WithComma(scope.Key())});
+  Write(m_out, "void operator=($argument$) { $self$->Set$field$($key$_v); }\n",
+        "argument"_ = ConstReferenceText(type, "_v"), "self"_ = scope.self, "field"_ = scope.accessor,
+        "key"_ = WithComma(scope.Key()));
 }
 
 void AttributeWriter::WriteVector(const Scope& scope, TypeView element) {
   if (scope.readOnly) return;
-  const std::string type = TypeText(element);
-  const std::string key = WithComma(scope.Key());
-  auto write = [&](const std::string& heading, const std::string& statement) {
-    m_out << "void " << heading << "\n";
-    Block body(m_out);
-    m_out << statement << "\n";
-  };
-  write("insert(vesk::ssize_t _i," + type + " const* _src,vesk::ssize_t _n)",
-        scope.self + "->CreateInto" + scope.accessor + "(" + key + "_i,_src,_n);");
-  write("insert(vesk::ssize_t _i," + type + " const& _v)", "insert(_i,&_v,1);");
-  write("push_front(" + type + " const& _v)", "insert(0,_v);");
-  write("push_back(" + type + " const& _v)", "insert(model().size(),_v);");
-  write("erase_range(vesk::ssize_t _i1,vesk::ssize_t _i2)",
-        scope.self + "->DeleteFrom" + scope.accessor + "(" + key + "_i1,_i2);");
-  write("erase(vesk::ssize_t _i)", "erase_range(_i,_i+1);");
-  write("pop_front()", "erase(0);");
-  write("pop_back()", "erase(model().size()-1);");
-  write("clear()", "erase_range(0,model().size());");
+  Write(m_out, R"(
+    void insert(vesk::ssize_t _i,$type$ const* _src,vesk::ssize_t _n)
+    {
+        $self$->CreateInto$field$($key$_i,_src,_n);
+    }
+    void insert(vesk::ssize_t _i,$type$ const& _v)
+    {
+        insert(_i,&_v,1);
+    }
+    void push_front($type$ const& _v)
+    {
+        insert(0,_v);
+    }
+    void push_back($type$ const& _v)
+    {
+        insert(model().size(),_v);
+    }
+    void erase_range(vesk::ssize_t _i1,vesk::ssize_t _i2)
+    {
+        $self$->DeleteFrom$field$($key$_i1,_i2);
+    }
+    void erase(vesk::ssize_t _i)
+    {
+        erase_range(_i,_i+1);
+    }
+    void pop_front()
+    {
+        erase(0);
+    }
+    void pop_back()
+    {
+        erase(model().size()-1);
+    }
+    void clear()
+    {
+        erase_range(0,model().size());
+    }
+  )",
+        "type"_ = element, "self"_ = scope.self, "field"_ = scope.accessor, "key"_ = WithComma(scope.Key()));
 }
 
 void AttributeWriter::WriteKeySet(const Scope& scope, TypeView key) {
   if (scope.readOnly) return;
-  const std::string type = TypeText(key);
-  auto write = [&](std::string_view member, std::string_view accessor) {
-    m_out << "bool " << member << "(" << type << " const& _key)\n";
-    Block body(m_out);
-    m_out << "return " << scope.self << "->" << accessor << scope.accessor << "(" << WithComma(scope.Key())
-          << "_key);\n";
-  };
-  write("Insert", "InsertInto");
-  write("Delete", "DeleteFrom");
+  Write(m_out, R"(
+    bool Insert($type$ const& _key)
+    {
+        return $self$->InsertInto$field$($key$_key);
+    }
+    bool Delete($type$ const& _key)
+    {
+        return $self$->DeleteFrom$field$($key$_key);
+    }
+  )",
+        "type"_ = key, "self"_ = scope.self, "field"_ = scope.accessor, "key"_ = WithComma(scope.Key()));
 }
 
 // An element can't be a member of the union, so operator[] answers a small struct of the enclosing object and the
@@ -203,36 +243,47 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
   m_path.Push(std::move(element));
   const std::string proxy = scope.accessor + "Element";
   const std::string index = ParameterName(scope.depth);
-  m_out << "struct " << proxy << "\n{\n";
-  {
-    IndentScope indent(m_out, 4);
-    WriteText(m_out, "$0($1* _self, $2 _k) : _self(_self),$3(_k) {}\n", {proxy, scope.className, keyType, index});
-    if (NeedsForwarders(WithoutDecorators(elementType, m_root).type.Op())) {
-      WriteForwarders(scope.depth, scope.depth, elementType, proxy, scope.readOnly);
+  const Scope elementScope{.className = proxy,
+                           .depth = scope.depth + 1,
+                           .self = "_self",
+                           .constSelf = "_self",
+                           .accessor = proxy,
+                           .member = proxy,
+                           .inProxy = true,
+                           .readOnly = scope.readOnly};
+  auto writeForwarders = [&] {
+    if (!NeedsForwarders(WithoutDecorators(elementType, m_root).type.Op())) return;
+    WriteForwarders(scope.depth, scope.depth, elementType, proxy, scope.readOnly);
+  };
+  auto writeWritableIndexing = [&] {
+    if (scope.readOnly) return;
+    Write(m_out, R"(
+      $proxy$ operator[]($key$ $index$)
+      {
+          return $proxy$($self$,$index$);
+      }
+    )",
+          "proxy"_ = proxy, "key"_ = keyType, "index"_ = index, "self"_ = scope.inProxy ? "this" : scope.self);
+  };
+  Write(
+      m_out, R"(
+    struct $proxy$
+    {
+        $proxy$($object$* _self, $key$ _k) : _self(_self),$index$(_k) {}
+        $forwarders$
+        $operators$
+        $object$* _self;
+        $key$ $index$;
+    };
+    $writableIndexing$
+    $proxy$ const operator[]($key$ $index$) const
+    {
+        return $proxy$(const_cast<$object$*>($self$),$index$);
     }
-    WriteOperators({.className = proxy,
-                    .depth = scope.depth + 1,
-                    .self = "_self",
-                    .constSelf = "_self",
-                    .accessor = proxy,
-                    .member = proxy,
-                    .inProxy = true,
-                    .readOnly = scope.readOnly},
-                   elementType);
-    WriteText(m_out, "$0* _self;\n$1 $2;\n", {scope.className, keyType, index});
-  }
-  m_out << "};\n";
-  if (!scope.readOnly) {
-    m_out << proxy << " operator[](" << keyType << " " << index << ")\n";
-    Block body(m_out);
-    WriteText(m_out, "return $0($1,$2);\n", {proxy, scope.inProxy ? "this" : scope.self, index});
-  }
-  m_out << proxy << " const operator[](" << keyType << " " << index << ") const\n";
-  {
-    Block body(m_out);
-    WriteText(m_out, "return $0(const_cast<$1*>($2),$3);\n",
-              {proxy, scope.className, scope.inProxy ? "this" : scope.constSelf, index});
-  }
+  )",
+      "proxy"_ = proxy, "object"_ = scope.className, "key"_ = keyType, "index"_ = index,
+      "forwarders"_ = writeForwarders, "operators"_ = [&] { WriteOperators(elementScope, elementType); },
+      "writableIndexing"_ = writeWritableIndexing, "self"_ = scope.inProxy ? "this" : scope.constSelf);
   m_path.Pop();
 }
 
@@ -245,26 +296,34 @@ void AttributeWriter::WriteForwarders(size_t first, size_t last, TypeView type, 
   const TypeOp op = inner.Op();
   const std::string parameters = ForwardedParameters(first, last);
   const std::string arguments = FieldPath::Arguments(first, last + 1);
-  WriteText(m_out,
-            "vesk::Path Get$0Path($1) const { return _self->Get$0Path($2); }\n"
-            "$3 const& _model__$0($1) const { return _self->_model__$0($2); }\n"
-            "$3& _model__$0($1) { return _self->_model__$0($2); }\n"
-            "$3 const& Get$0($1) const { return _self->Get$0($2); }\n",
-            {name, parameters, arguments, TypeText(type)});
+  Write(m_out, R"(
+    vesk::Path Get$name$Path($parameters$) const { return _self->Get$name$Path($arguments$); }
+    $type$ const& _model__$name$($parameters$) const { return _self->_model__$name$($arguments$); }
+    $type$& _model__$name$($parameters$) { return _self->_model__$name$($arguments$); }
+    $type$ const& Get$name$($parameters$) const { return _self->Get$name$($arguments$); }
+  )",
+        "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments, "type"_ = TypeText(type));
 
   if (undecorated.Has(kHasAssignable) || IsForwardedScalar(op)) {
     if (readOnly) return;
-    WriteText(m_out, "void $0$1($2$3) { _self->$0$1($4_v); }\n",
-              {undecorated.Has(kHasOffsettable) ? "Offset" : "Set", name, WithComma(parameters),
-               ConstReferenceText(type, "_v"), WithComma(arguments)});
+    Write(m_out, "void $verb$$name$($parameters$$value$) { _self->$verb$$name$($arguments$_v); }\n",
+          "verb"_ = undecorated.Has(kHasOffsettable) ? "Offset" : "Set", "name"_ = name,
+          "parameters"_ = WithComma(parameters), "value"_ = ConstReferenceText(type, "_v"),
+          "arguments"_ = WithComma(arguments));
   } else if (IsVectorLike(inner)) {
     if (readOnly) return;
-    WriteText(m_out,
-              "void CreateInto$0($1vesk::ssize_t _i,$2 const* _src,vesk::ssize_t _n)\n"
-              "{\n    _self->CreateInto$0($3_i,_src,_n);\n}\n"
-              "void DeleteFrom$0($1vesk::ssize_t _i1,vesk::ssize_t _i2)\n"
-              "{\n    _self->DeleteFrom$0($3_i1,_i2);\n}\n",
-              {name, WithComma(parameters), TypeText(VectorElement(inner)), WithComma(arguments)});
+    Write(m_out, R"(
+      void CreateInto$name$($parameters$vesk::ssize_t _i,$element$ const* _src,vesk::ssize_t _n)
+      {
+          _self->CreateInto$name$($arguments$_i,_src,_n);
+      }
+      void DeleteFrom$name$($parameters$vesk::ssize_t _i1,vesk::ssize_t _i2)
+      {
+          _self->DeleteFrom$name$($arguments$_i1,_i2);
+      }
+    )",
+          "name"_ = name, "parameters"_ = WithComma(parameters), "element"_ = TypeText(VectorElement(inner)),
+          "arguments"_ = WithComma(arguments));
   } else if (op == kOpClass) {
     const NameSpaceElement* element = NamedElement(inner, m_root);
     if (!element || element->category != Category::Class) return;
@@ -280,10 +339,14 @@ void AttributeWriter::WriteForwarders(size_t first, size_t last, TypeView type, 
   } else if (op == kOpSet) {
     if (readOnly) return;
     for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {
-      WriteText(m_out,
-                "bool $0$1($2$3 const& _key)\n"
-                "{\n    return _self->$0$1($4_key);\n}\n",
-                {verb, name, WithComma(parameters), TypeText(inner.Inner()), WithComma(arguments)});
+      Write(m_out, R"(
+        bool $verb$$name$($parameters$$key$ const& _key)
+        {
+            return _self->$verb$$name$($arguments$_key);
+        }
+      )",
+            "verb"_ = verb, "name"_ = name, "parameters"_ = WithComma(parameters), "key"_ = inner.Inner(),
+            "arguments"_ = WithComma(arguments));
     }
   } else {
     TraceWriter() << "*bc = " << static_cast<uint8_t>(op) << "\n";
@@ -294,18 +357,19 @@ void AttributeWriter::WriteContainerForwarders(size_t first, size_t last, PathEl
                                                const std::string& name, bool readOnly) {
   const std::string parameters = ForwardedParameters(first, last);
   const std::string arguments = FieldPath::Arguments(first, last + 1);
-  WriteText(m_out, "vesk::ssize_t Get$0Size($1) const { return _self->Get$0Size($2); }\n",
-            {name, parameters, arguments});
+  Write(m_out, "vesk::ssize_t Get$name$Size($parameters$) const { return _self->Get$name$Size($arguments$); }\n",
+        "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments);
   m_path.Push(std::move(element));
   if (elementType.WithoutMetadata().IsBuiltIn()) {
-    const std::string deeper = ForwardedParameters(first, last + 1);
-    const std::string deeperArguments = FieldPath::Arguments(first, last + 2);
-    const std::string type = TypeText(elementType);
-    WriteText(m_out, "$0 const& Get$1Element($2) const { return _self->Get$1Element($3); }\n",
-              {type, name, deeper, deeperArguments});
+    const std::string elementParameters = ForwardedParameters(first, last + 1);
+    const std::string elementArguments = FieldPath::Arguments(first, last + 2);
+    Write(m_out,
+          "$type$ const& Get$name$Element($parameters$) const { return _self->Get$name$Element($arguments$); }\n",
+          "type"_ = elementType, "name"_ = name, "parameters"_ = elementParameters, "arguments"_ = elementArguments);
     if (!readOnly) {
-      WriteText(m_out, "void Set$1Element($2$0 _e) { _self->Set$1Element($3_e); }\n",
-                {type, name, WithComma(deeper), WithComma(deeperArguments)});
+      Write(m_out, "void Set$name$Element($parameters$$type$ _e) { _self->Set$name$Element($arguments$_e); }\n",
+            "name"_ = name, "parameters"_ = WithComma(elementParameters), "type"_ = elementType,
+            "arguments"_ = WithComma(elementArguments));
     }
   } else {
     WriteForwarders(first, last + 1, elementType, name + "Element", readOnly);

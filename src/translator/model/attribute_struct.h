@@ -48,7 +48,7 @@ class AttributeWriter {
   };
 
   void WriteOperators(Scope scope, TypeView type);
-  void WriteConversions(const Scope& scope, std::string_view typeText, bool isOffsettable);
+  void WriteConversions(const Scope& scope, std::string_view type, bool isOffsettable);
   void WriteModel(const Scope& scope, const ClassDef& model);
   void WriteOffset(const Scope& scope, TypeView type, TypeOp op);
   void WritePlain(const Scope& scope, TypeView type, TypeView inner);

@@ -23,74 +23,80 @@ std::vector<const ModelField*> NonDropped(const ClassDef& def) {
 std::string ModelScope(const ClassDef& def) { return def.name + (def.m_inheritsModel ? "_model" : ""); }
 
 void WriteDefaultConstructor(TextWriter& out, const ClassDef& def) {
-  out << def.ModelStructName() << "()";
-  bool first = true;
-  for (const ModelField* field : NonDropped(def)) {
-    const TypeView type = WithoutDecorators(field->m_type, *def.owner.rootNameSpace).type;
-    if (!type.IsScalar() && type.Op() != kOpEnum && type.Op() != kOpPointer) continue;
-    out << (first ? " : " : ",") << field->m_name;
-    first = false;
-    if (type.Op() == kOpEnum) {
-      out << "((" << TypeText(type) << ")0)";
-    } else {
-      out << "(0)";
+  auto writeInitialisers = [&] {
+    std::string_view separator = " : ";
+    for (const ModelField* field : NonDropped(def)) {
+      const TypeView type = WithoutDecorators(field->m_type, *def.owner.rootNameSpace).type;
+      const bool isEnum = type.Op() == kOpEnum;
+      if (!type.IsScalar() && !isEnum && type.Op() != kOpPointer) continue;
+      Write(out, "$separator$$name$($cast$0)", "separator"_ = separator, "name"_ = field->m_name,
+            "cast"_ = isEnum ? "(" + TypeText(type) + ")" : "");
+      separator = ",";
     }
-  }
-  out << " {}\n";
+  };
+  Write(out, "$name$()$initialisers$ {}\n", "name"_ = def.ModelStructName(), "initialisers"_ = writeInitialisers);
 }
 
 void WriteMemberwiseConstructor(TextWriter& out, const ClassDef& def) {
   const auto fields = NonDropped(def);
   if (fields.empty()) return;
-  if (fields.size() == 1) out << "explicit ";
-  out << def.ModelStructName() << "(";
-  WriteJoined(out, fields, ",", [&](const ModelField* field) {
-    PrintType(out, field->m_type);
-    out << " const& " << field->m_name << "_";
-  });
-  out << ") : ";
-  WriteJoined(out, fields, ",", [&](const ModelField* field) { out << field->m_name << "(" << field->m_name << "_)"; });
-  out << " {}\n";
+  auto writeParameter = [&](const ModelField* field) {
+    Write(out, "$type$ const& $name$_", "type"_ = TypeView(field->m_type), "name"_ = field->m_name);
+  };
+  auto writeInitialiser = [&](const ModelField* field) { Write(out, "$name$($name$_)", "name"_ = field->m_name); };
+  Write(out, "$explicit$$name$($parameters$) : $initialisers$ {}\n",
+        "explicit"_ = fields.size() == 1 ? "explicit " : "", "name"_ = def.ModelStructName(),
+        "parameters"_ = Each(out, fields, ",", writeParameter),
+        "initialisers"_ = Each(out, fields, ",", writeInitialiser));
 }
 
 // The four comparisons that follow from == and <.
 void WriteDerivedComparisons(TextWriter& out, std::string_view name) {
-  WriteText(out,
-            "bool operator!=($0 const& _rhs) const { return !operator==(_rhs); }\n"
-            "bool operator<=($0 const& _rhs) const { return !_rhs.operator<(*this); }\n"
-            "bool operator>($0 const& _rhs) const { return _rhs.operator<(*this); }\n"
-            "bool operator>=($0 const& _rhs) const { return !operator<(_rhs); }\n",
-            {name});
+  Write(out, R"(
+    bool operator!=($name$ const& _rhs) const { return !operator==(_rhs); }
+    bool operator<=($name$ const& _rhs) const { return !_rhs.operator<(*this); }
+    bool operator>($name$ const& _rhs) const { return _rhs.operator<(*this); }
+    bool operator>=($name$ const& _rhs) const { return !operator<(_rhs); }
+  )",
+        "name"_ = name);
+}
+
+void WriteReturnLess(TextWriter& out, const std::vector<const ModelField*>& fields) {
+  out << "return ";
+  for (const ModelField* field : fields) {
+    Write(out, "($name$ < _rhs.$name$", "name"_ = field->m_name);
+    if (field != fields.back()) Write(out, " || ($name$ == _rhs.$name$ &&\n", "name"_ = field->m_name);
+  }
+  out << (fields.empty() ? "true" : std::string(2 * fields.size() - 1, ')')) << ";\n";
+}
+
+void WriteReturnEqual(TextWriter& out, const std::vector<const ModelField*>& fields) {
+  if (fields.empty()) {
+    out << "return true;\n";
+    return;
+  }
+  auto writeEqual = [&](const ModelField* field) { Write(out, "$name$ == _rhs.$name$", "name"_ = field->m_name); };
+  Write(out, "return $fields$;\n", "fields"_ = Each(out, fields, " &&\n", writeEqual));
 }
 
 void WriteComparisons(TextWriter& out, const ClassDef& def) {
   const auto fields = NonDropped(def);
   const std::string name = def.ModelStructName();
-  out << "bool operator<(" << name << " const& _rhs) const\n";
-  {
-    Block body(out);
-    out << "return ";
-    for (const ModelField* field : fields) {
-      WriteText(out, field == fields.back() ? "($0 < _rhs.$0" : "($0 < _rhs.$0 || ($0 == _rhs.$0 &&\n",
-                {field->m_name});
+  Write(
+      out, R"(
+    bool operator<($name$ const& _rhs) const
+    {
+        $returnLess$
     }
-    if (fields.empty()) {
-      out << "true";
-    } else {
-      out << std::string(2 * fields.size() - 1, ')');
+    bool operator==($name$ const& _rhs) const
+    {
+        $returnEqual$
     }
-    out << ";\n";
-  }
-  out << "bool operator==(" << name << " const& _rhs) const\n";
-  {
-    Block body(out);
-    out << "return ";
-    WriteJoined(out, fields, " &&\n",
-                [&](const ModelField* field) { WriteText(out, "$0 == _rhs.$0", {field->m_name}); });
-    if (fields.empty()) out << "true";
-    out << ";\n";
-  }
-  WriteDerivedComparisons(out, name);
+    $derivedComparisons$
+  )",
+      "name"_ = name, "returnLess"_ = [&] { WriteReturnLess(out, fields); },
+      "returnEqual"_ = [&] { WriteReturnEqual(out, fields); },
+      "derivedComparisons"_ = [&] { WriteDerivedComparisons(out, name); });
 }
 
 void WriteFieldDeclarations(TextWriter& out, const ClassDef& def) {
@@ -104,8 +110,10 @@ void WriteStructMembers(TextWriter& out, const ClassDef& def) {
   if (!def.m_haveModelDefaultCtor) WriteDefaultConstructor(out, def);
   WriteMemberwiseConstructor(out, def);
   if (def.CanSerialiseEmbeddedModel()) {
-    out << "void Serialise(vesk::Archive&) const;\n"
-           "void Deserialise(vesk::InputArchive&);\n";
+    Write(out, R"(
+      void Serialise(vesk::Archive&) const;
+      void Deserialise(vesk::InputArchive&);
+    )");
   }
   if (def.MemberPlacement() == Placement::InClass || def.m_isAnonymous) {
     WriteVisiting(out, def, Placement::InClass);
@@ -122,8 +130,9 @@ void WriteStructMembers(TextWriter& out, const ClassDef& def) {
 
 void ParseModelStruct(QrexParser& parser, ClassDef& def) {
   TextWriter& out = parser.out;
-  if (def.IsTemplate()) out << "template <" << def.m_templateArgList << "> ";
-  out << "struct " << ExportPrefix(def) << def.ModelStructName() << "\n";
+  Write(out, "$template$struct $api$$name$\n",
+        "template"_ = def.IsTemplate() ? "template <" + def.m_templateArgList + "> " : "", "api"_ = ExportPrefix(def),
+        "name"_ = def.ModelStructName());
   Block body(out, ";");
   ParseModelBlock(parser, def, Expansion::AttributeStructs);  // a mixin goes with the struct
   out << "\n";
@@ -139,53 +148,79 @@ void WriteModelFieldsAndAccessors(TextWriter& out, const ClassDef& def) {
 
 void WriteSerialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
-  if (placement == Placement::InClass) {
-    out << "template<typename Archive> void Serialise(Archive& _ar) const\n";
-  } else {
-    out << "void " << ModelScope(def) << "::Serialise(vesk::Archive& _ar) const\n";
-  }
-  Block body(out);
-  const auto fields = NonDropped(def);
-  if (fields.empty()) return;
-  out << "_ar ";
-  WriteJoined(out, fields, "\n   ", [&](const ModelField* field) { out << "<< this->" << field->m_name; });
-  out << ";\n";
+  auto writeFields = [&] {
+    const auto fields = NonDropped(def);
+    if (fields.empty()) return;
+    auto writeField = [&](const ModelField* field) { out << "<< this->" << field->m_name; };
+    Write(out, "_ar $fields$;\n", "fields"_ = Each(out, fields, "\n   ", writeField));
+  };
+  Write(out, R"(
+    $heading$
+    {
+        $fields$
+    }
+  )",
+        "heading"_ = placement == Placement::InClass
+                         ? "template<typename Archive> void Serialise(Archive& _ar) const"
+                         : "void " + ModelScope(def) + "::Serialise(vesk::Archive& _ar) const",
+        "fields"_ = writeFields);
 }
 
 namespace {
 
-void WriteEvolveCode(TextWriter& out, const ClassDef& def) {
-  out << "struct EvolveCode\n";
-  Block body(out, ";");
+void WriteEvolveFunctions(TextWriter& out, const ClassDef& def) {
   for (const ModelField* field : def.m_modelFields) {
     if (field->m_evolveCode.empty()) continue;
-    out << "static void calc_" << field->m_name << "(" << TypeText(field->m_type) << "& " << field->m_name;
-    for (size_t index : field->m_evolveArgs) {
+    auto writeArgument = [&](size_t index) {
       const ModelField& argument = *def.m_modelFields[index];
-      out << "," << TypeText(argument.m_type) << " const& " << argument.m_name;
-    }
-    out << ") { " << field->m_evolveCode << " }\n";
+      Write(out, ",$type$ const& $name$", "type"_ = TypeView(argument.m_type), "name"_ = argument.m_name);
+    };
+    Write(out, "static void calc_$name$($type$& $name$$arguments$) { $code$ }\n", "name"_ = field->m_name,
+          "type"_ = TypeView(field->m_type), "arguments"_ = Each(out, field->m_evolveArgs, "", writeArgument),
+          "code"_ = field->m_evolveCode);
   }
 }
 
-std::string EvolveCall(const ClassDef& def, const ModelField& field) {
-  if (field.m_evolveCode.empty()) return {};
-  std::string call = "EvolveCode::calc_" + field.m_name + "(" + field.m_name;
-  for (size_t index : field.m_evolveArgs) call += "," + def.m_modelFields[index]->m_name;
-  return call + ");";
+void WriteEvolveCall(TextWriter& out, const ClassDef& def, const ModelField& field) {
+  if (field.m_evolveCode.empty()) return;
+  auto writeArgument = [&](size_t index) { out << "," << def.m_modelFields[index]->m_name; };
+  Write(out, "EvolveCode::calc_$name$($name$$arguments$);", "name"_ = field.m_name,
+        "arguments"_ = Each(out, field.m_evolveArgs, "", writeArgument));
 }
 
 void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& field) {
-  const bool isFirst = field.m_rsnAdded == def.m_firstRsn;
   out << "\n";
   // A dropped field is read into a local variable, where later evolve calls find it.
-  if (field.IsDropped()) out << TypeText(field.m_type) << " " << field.m_name << ";\n";
-  if (!isFirst) out << "if (_rsn <= " << field.m_rsnAdded - 1 << ") { " << EvolveCall(def, field) << " }\n";
-  if (!isFirst) out << "else ";
   if (field.IsDropped()) {
-    out << "if (_rsn < " << field.m_rsnDropped << ") _ar >> " << field.m_name << ";\n";
+    Write(out, "$type$ $name$;\n", "type"_ = TypeView(field.m_type), "name"_ = field.m_name);
+  }
+  if (field.m_rsnAdded != def.m_firstRsn) {
+    Write(
+        out, "if (_rsn <= $lastWithout$) { $evolve$ }\nelse ", "lastWithout"_ = field.m_rsnAdded - 1,
+        "evolve"_ = [&] { WriteEvolveCall(out, def, field); });
+  }
+  if (field.IsDropped()) {
+    Write(out, "if (_rsn < $dropped$) _ar >> $name$;\n", "dropped"_ = field.m_rsnDropped, "name"_ = field.m_name);
   } else {
     out << "_ar >> this->" << field.m_name << ";\n";
+  }
+}
+
+void WriteReads(TextWriter& out, const ClassDef& def) {
+  if (def.m_numModelSchema >= 2) {
+    Write(
+        out, R"(
+      vesk::RSN _rsn = vesk::$target$_GetModelRsn();
+      struct EvolveCode
+      {
+          $functions$
+      };
+    )",
+        "target"_ = TargetIdentifier(def), "functions"_ = [&] { WriteEvolveFunctions(out, def); });
+    for (const ModelField* field : def.m_modelFields) WriteVersionedRead(out, def, *field);
+  } else if (!def.m_modelFields.empty()) {
+    auto writeField = [&](const ModelField* field) { out << ">> this->" << field->m_name; };
+    Write(out, "_ar $fields$;\n", "fields"_ = Each(out, def.m_modelFields, "\n   ", writeField));
   }
 }
 
@@ -193,57 +228,91 @@ void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& 
 
 void WriteDeserialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
-  out << "void ";
-  if (placement == Placement::OutOfClass) out << ModelScope(def) << "::";
-  out << "Deserialise(vesk::InputArchive& _ar)\n";
-  Block body(out);
-  if (def.m_numModelSchema < 2) {
-    if (def.m_modelFields.empty()) return;
-    out << "_ar ";
-    WriteJoined(out, def.m_modelFields, "\n   ", [&](const ModelField* field) { out << ">> this->" << field->m_name; });
-    out << ";\n";
-    return;
-  }
-  out << "vesk::RSN _rsn = vesk::" << TargetIdentifier(def) << "_GetModelRsn();\n";
-  WriteEvolveCode(out, def);
-  for (const ModelField* field : def.m_modelFields) WriteVersionedRead(out, def, *field);
+  Write(
+      out, R"(
+    void $scope$Deserialise(vesk::InputArchive& _ar)
+    {
+        $reads$
+    }
+  )",
+      "scope"_ = placement == Placement::OutOfClass ? ModelScope(def) + "::" : "",
+      "reads"_ = [&] { WriteReads(out, def); });
 }
 
 // --- Visiting
 
 void WriteVisiting(TextWriter& out, const ClassDef& def, Placement placement) {
-  NameSpace& root = *def.owner.rootNameSpace;
   const auto fields = NonDropped(def);
-  std::string heading = "void ";
-  if (placement == Placement::OutOfClass) {
-    heading = def.TemplatePrefix() + "void " + ModelScope(def) + def.TemplateArgs() + "::";
-  }
+  const std::string heading = placement == Placement::OutOfClass
+                                  ? def.TemplatePrefix() + "void " + ModelScope(def) + def.TemplateArgs() + "::"
+                                  : "void ";
   if (!def.GenerateOps()) {
-    out << heading << "EvictDgsNodes() const {";
-    for (const ModelField* field : fields) out << "vesk::DataSourceEvict(&" << field->m_name << ");";
-    out << "}\n";
+    auto writeEvict = [&](const ModelField* field) { out << "vesk::DataSourceEvict(&" << field->m_name << ");"; };
+    Write(out, "$heading$EvictDgsNodes() const {$fields$}\n", "heading"_ = heading,
+          "fields"_ = Each(out, fields, "", writeEvict));
   }
-  auto writeVisit = [&](std::string_view function, bool (*isVisitable)(TypeView, NameSpace&)) {
-    out << heading << function << "& _v) const {";
-    bool any = false;
-    for (const ModelField* field : fields) {
-      if (!isVisitable(field->m_type, root)) continue;
-      out << (any ? "" : "_v") << " << " << field->m_name;
-      any = true;
-    }
-    out << (any ? ";}\n" : "}\n");
+  auto writeVisit = [&](std::string_view what, std::string_view visitor, bool (*isVisitable)(TypeView, NameSpace&)) {
+    auto writeFields = [&] {
+      bool any = false;
+      for (const ModelField* field : fields) {
+        if (!isVisitable(field->m_type, *def.owner.rootNameSpace)) continue;
+        out << (any ? "" : "_v") << " << " << field->m_name;
+        any = true;
+      }
+      if (any) out << ";";
+    };
+    Write(out, "$heading$Visit$what$(vesk::$visitor$& _v) const {$fields$}\n", "heading"_ = heading, "what"_ = what,
+          "visitor"_ = visitor, "fields"_ = writeFields);
   };
-  writeVisit("VisitObjects(vesk::IObjectVisitor", NeedsVisitObjects);
-  writeVisit("VisitPrefs(vesk::IPrefVisitor", NeedsVisitPrefs);
+  writeVisit("Objects", "IObjectVisitor", NeedsVisitObjects);
+  writeVisit("Prefs", "IPrefVisitor", NeedsVisitPrefs);
 }
 
 void WriteVisitingDeclarations(TextWriter& out, const ClassDef& def) {
-  if (!def.GenerateOps()) out << "void EvictDgsNodes() const;\n";
-  out << "void VisitObjects(vesk::IObjectVisitor& _v) const;\n"
-         "void VisitPrefs(vesk::IPrefVisitor& _v) const;\n";
+  Write(out, R"(
+    $evict$
+    void VisitObjects(vesk::IObjectVisitor& _v) const;
+    void VisitPrefs(vesk::IPrefVisitor& _v) const;
+  )",
+        "evict"_ = def.GenerateOps() ? "" : "void EvictDgsNodes() const;");
 }
 
 // --- Mixin
+
+namespace {
+
+// The functions of a mixin that give the whole model, behind the barriers that reading and writing need.
+void WriteReadAndWrite(TextWriter& out, const ClassDef& def, const ClassDef& model, std::string_view type,
+                       Access access) {
+  if (access == Access::Operations) {
+    Write(out, R"(
+      $type$ const& read() const { vesk::IndepFieldReadBarrier($object$, vesk::Path()); return _model_; }
+    )",
+          "type"_ = type, "object"_ = kConstFinal);
+    return;
+  }
+  Write(out, R"(
+    $type$ const& read() const { vesk::DataSourceReadBarrier($constFinal$, $constObject$,"$name$"); return _model_; }
+    $type$ & write() { vesk::DataSourceWriteBarrier($final$, $object$,"$name$"); return _model_; }
+  )",
+        "type"_ = type, "name"_ = def.name, "constFinal"_ = kConstFinal, "final"_ = kFinal,
+        "constObject"_ = model.m_implementsIObject ? kConstFinal : "vesk::null",
+        "object"_ = model.m_implementsIObject ? kFinal : "vesk::null");
+}
+
+void WriteAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
+  if (model.GetNumNonDroppedModelFields() == 0) return;
+  Write(
+      out, R"(
+    union
+    {
+        $structs$
+    };
+  )",
+      "structs"_ = [&] { WriteModelMixinAttributeStructs(out, def, model, access); });
+}
+
+}  // namespace
 
 void WriteModelMixin(TextWriter& out, const ClassDef& def) {
   const ClassDef& model = def.m_referencedModel ? *def.m_referencedModel : def;
@@ -251,49 +320,35 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
   const std::string type = model.QualifiedModelStructName() + model.TemplateArgs();
   const bool operations = def.GenerateOps() && model.qualifiers.genop != TriState::Off;
   const Access access = operations ? Access::Operations : Access::Barriers;
-  out << "template <typename BC" << (def.IsTemplate() ? "," + def.m_templateArgList : "") << ">\n";
-  out << "struct " << mixin << " : public BC\n";
-  Block body(out, ";");
-  out << "using typename BC::FinalClass;\n\n";
-  WriteText(out,
-            "bool operator<($0 const& _rhs) const {return _model_ < _rhs._model_;}\n"
-            "bool operator==($0 const& _rhs) const {return _model_ == _rhs._model_;}\n",
-            {mixin});
-  WriteDerivedComparisons(out, mixin);
-  out << "void EvictDgsNodes() const {BC::EvictDgsNodes();"
-      << (def.GenerateOps() ? "vesk::EvictIndepFieldsUnderObject(static_cast<const typename BC::FinalClass*>(this));"
-                            : "_model_.EvictDgsNodes();")
-      << "}\n";
-  out << "void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}\n"
-         "void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}\n";
-  WriteModelMixinAccessors(out, def, model, access);
-  if (model.GetNumNonDroppedModelFields() > 0) {
-    out << "union\n";
-    Block attributes(out, ";");
-    WriteModelMixinAttributeStructs(out, def, model, access);
-  }
-  WriteText(out,
-            "typedef $0 model_type;\n"
-            "$0 const& model() const { return _model_; }\n"
-            "$0& model() { return _model_; }\n",
-            {type});
-  const std::string_view constObject =
-      model.m_implementsIObject ? "static_cast<const typename BC::FinalClass*>(this)" : "vesk::null";
-  const std::string_view object =
-      model.m_implementsIObject ? "static_cast<typename BC::FinalClass*>(this)" : "vesk::null";
-  if (operations) {
-    out << type
-        << " const& read() const { vesk::IndepFieldReadBarrier(static_cast<const typename BC::FinalClass*>(this), "
-           "vesk::Path()); return _model_; }\n";
-  } else {
-    WriteText(out,
-              "$0 const& read() const { vesk::DataSourceReadBarrier(static_cast<const typename "
-              "BC::FinalClass*>(this), $1,\"$3\"); return _model_; }\n"
-              "$0 & write() { vesk::DataSourceWriteBarrier(static_cast<typename BC::FinalClass*>(this), $2,\"$3\"); "
-              "return _model_; }\n",
-              {type, constObject, object, def.name});
-  }
-  out << type << " _model_;\n";
+  Write(
+      out, R"(
+    template <typename BC$templateParameters$>
+    struct $mixin$ : public BC
+    {
+        using typename BC::FinalClass;
+
+        bool operator<($mixin$ const& _rhs) const {return _model_ < _rhs._model_;}
+        bool operator==($mixin$ const& _rhs) const {return _model_ == _rhs._model_;}
+        $derivedComparisons$
+        void EvictDgsNodes() const {BC::EvictDgsNodes();$evict$;}
+        void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}
+        void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}
+        $accessors$
+        $attributeStructs$
+        typedef $type$ model_type;
+        $type$ const& model() const { return _model_; }
+        $type$& model() { return _model_; }
+        $readAndWrite$
+        $type$ _model_;
+    };
+  )",
+      "templateParameters"_ = def.IsTemplate() ? "," + def.m_templateArgList : "", "mixin"_ = mixin, "type"_ = type,
+      "derivedComparisons"_ = [&] { WriteDerivedComparisons(out, mixin); },
+      "evict"_ = def.GenerateOps() ? "vesk::EvictIndepFieldsUnderObject(" + std::string(kConstFinal) + ")"
+                                   : "_model_.EvictDgsNodes()",
+      "accessors"_ = [&] { WriteModelMixinAccessors(out, def, model, access); },
+      "attributeStructs"_ = [&] { WriteAttributeStructs(out, def, model, access); },
+      "readAndWrite"_ = [&] { WriteReadAndWrite(out, def, model, type, access); });
 }
 
 // --- Around the class
@@ -311,55 +366,84 @@ bool KeepsDataSourceRsn(const ClassDef& def) {
 void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def) {
   const std::string target = TargetIdentifier(def);
   if (def.HasEmbeddedModel() && def.CanSerialiseEmbeddedModel()) {
-    out << "namespace vesk { RSN " << target << "_GetModelRsn(); }\n";
+    Write(out, "namespace vesk { RSN $target$_GetModelRsn(); }\n", "target"_ = target);
   }
-  if (KeepsDataSourceRsn(def)) {
-    WriteText(out,
-              "namespace vesk\n"
-              "{\n"
-              "    void $0_WriteDataSourceRsn(Archive& ar);\n"
-              "    void $0_ReadDataSourceRsn(InputArchive& ar);\n"
-              "}\n",
-              {target});
-  }
+  if (!KeepsDataSourceRsn(def)) return;
+  Write(out, R"(
+    namespace vesk
+    {
+        void $target$_WriteDataSourceRsn(Archive& ar);
+        void $target$_ReadDataSourceRsn(InputArchive& ar);
+    }
+  )",
+        "target"_ = target);
 }
 
 void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def) {
   if (!KeepsDataSourceRsn(def)) return;
-  const std::string target = TargetIdentifier(def);
-  out << "void " << def.name << "::Serialise(vesk::Archive& _ar) const\n";
-  {
-    Block body(out);
-    out << "vesk::" << target << "_WriteDataSourceRsn(_ar);\n_model_.Serialise(_ar);\n";
-  }
-  out << "void " << def.name << "::Deserialise(vesk::InputArchive& _ar)\n";
-  Block body(out);
-  out << "vesk::" << target << "_ReadDataSourceRsn(_ar);\n_model_.Deserialise(_ar);\n";
+  Write(out, R"(
+    void $name$::Serialise(vesk::Archive& _ar) const
+    {
+        vesk::$target$_WriteDataSourceRsn(_ar);
+        _model_.Serialise(_ar);
+    }
+    void $name$::Deserialise(vesk::InputArchive& _ar)
+    {
+        vesk::$target$_ReadDataSourceRsn(_ar);
+        _model_.Deserialise(_ar);
+    }
+  )",
+        "name"_ = def.name, "target"_ = TargetIdentifier(def));
 }
 
+namespace {
+
+// `path`: of the model in the object.
+void WriteInsertionLines(TextWriter& out, const ClassDef& def, std::string_view path) {
+  Write(out, R"(
+    _os << "$name$\n";
+    vesk::ScopeWriter2 sw(_os);
+  )",
+        "name"_ = def.name);
+  for (const ModelField* field : NonDropped(def)) {
+    Write(out, R"(
+      _os << "$name$ = " << _x.$path$$name$ << '\n';
+    )",
+          "name"_ = field->m_name, "path"_ = path);
+  }
+}
+
+void WriteInsertionList(TextWriter& out, const ClassDef& def, std::string_view path) {
+  const auto fields = NonDropped(def);
+  auto writeField = [&](const ModelField* field) { out << " << _x." << path << field->m_name; };
+  Write(out, R"(
+    _os << "$name$("$fields$ << ')';
+  )",
+        "name"_ = def.name, "fields"_ = Each(out, fields, " << ','", writeField));
+}
+
+}  // namespace
+
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
-  const std::string heading = "inline vesk::xostream& operator<<(vesk::xostream& _os," + def.name;
   if (def.m_referencedModel) {
-    out << "\n" << heading << " const& _x) { _os << _x._model_; return _os; }\n";
+    out << "\n";
+    Write(out, R"(
+      inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x) { _os << _x._model_; return _os; }
+    )",
+          "name"_ = def.name);
     return;
   }
   if (!def.IsPureModel() && !def.m_inheritsModel) return;
-  out << heading << " const& _x)\n";
-  Block body(out);
-  const std::string path = def.IsPureModel() ? "" : "_model_.";
-  if (def.qualifiers.multiline == TriState::On) {
-    out << "_os << \"" << def.name << "\\n\";\n";
-    out << "vesk::ScopeWriter2 sw(_os);\n";
-    for (const ModelField* field : NonDropped(def)) {
-      out << "_os << \"" << field->m_name << " = \" << _x." << path << field->m_name << " << '\\n';\n";
+  const auto writeFields = def.qualifiers.multiline == TriState::On ? WriteInsertionLines : WriteInsertionList;
+  Write(
+      out, R"(
+    inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x)
+    {
+        $fields$
+        return _os;
     }
-  } else {
-    out << "_os << \"" << def.name << "(\"";
-    WriteJoined(out, NonDropped(def), " << ','",
-                [&](const ModelField* field) { out << " << _x." << path << field->m_name; });
-    out << " << ')';\n";
-  }
-  out << "return _os;\n";
+  )",
+      "name"_ = def.name, "fields"_ = [&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); });
 }
 
 TypeView MapOrSetIn(TypeView type) {
@@ -381,20 +465,19 @@ size_t WriteModelFieldRows(TextWriter& out, const ClassDef& def) {
   const std::vector<MixedModelField> fields = AllModelFields(def);
   for (const auto& [field, fromMixin] : fields) {
     const std::string type = def.name + "_" + field->m_name;
-    out << "{ \"" << field->m_name << "\", ";
-    if (field->IsDropped()) {
-      out << "-1";
-    } else {
-      out << "offsetof(" << def.name << "," << (def.m_inheritsModel || fromMixin ? "_model_." : "") << field->m_name
-          << ")";
-    }
-    out << ", " << type << ", " << field->m_rsnAdded << ", " << field->m_rsnDropped;
-    if (HoldsMapOrSet(field->m_type)) out << "," << type << "_mapOrSetfns";
-    out << " },\n";
+    const std::string path = (def.m_inheritsModel || fromMixin ? "_model_." : "") + field->m_name;
+    Write(out, R"(
+      { "$name$", $offset$, $type$, $added$, $dropped$$mapOrSet$ },
+    )",
+          "name"_ = field->m_name, "offset"_ = field->IsDropped() ? "-1" : "offsetof(" + def.name + "," + path + ")",
+          "type"_ = type, "added"_ = field->m_rsnAdded, "dropped"_ = field->m_rsnDropped,
+          "mapOrSet"_ = HoldsMapOrSet(field->m_type) ? "," + type + "_mapOrSetfns" : "");
   }
   if (!def.m_referencedModel) return fields.size();
-  out << "{ \"" << def.m_referencedModel->GetQualifiedName() << "\", offsetof(" << def.name
-      << ",_model_), NULL, -1, -1 }\n";
+  Write(out, R"(
+    { "$model$", offsetof($name$,_model_), NULL, -1, -1 }
+  )",
+        "model"_ = def.m_referencedModel->GetQualifiedName(), "name"_ = def.name);
   return fields.size() + 1;
 }
 

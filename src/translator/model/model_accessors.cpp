@@ -20,7 +20,7 @@ class AccessorWriter {
         m_access(access),
         m_implementsIObject(implementsIObject) {}
 
-  void Write() {
+  void WriteAll() {
     for (size_t i = 0; i < m_model.m_modelFields.size(); ++i) {
       const ModelField& field = *m_model.m_modelFields[i];
       if (field.IsDropped()) continue;
@@ -39,10 +39,13 @@ class AccessorWriter {
   void WriteKeySet(TypeView key, const std::string& name, const std::string& expression);
 
   std::string PathCall(const std::string& name) const { return "Get" + name + "Path(" + m_path.Arguments() + ")"; }
-  std::string ReadBarrier(const std::string& name, const std::string& expression) const;
-  std::string WriteBarrier(const std::string& expression) const;
-  std::string GenopCall(std::string_view function, const std::string& name, const std::string& expression,
-                        std::string_view rest) const;
+  // Statements, each with what must stand ahead of it.
+  void WriteReadBarrier(const std::string& name, const std::string& expression);
+  void WriteWriteBarrier(const std::string& expression);
+  void WriteOperation(std::string_view function, const std::string& name, const std::string& expression,
+                      std::string_view arguments);
+
+  std::string_view AssignOperation(TypeView type) const;
   // "genop_XMVector" and the like: by what the elements hold.
   std::string VectorOperation(std::string_view verb, TypeView element) const;
   bool IsMovable(TypeView type) const { return WithoutDecorators(type, m_root).Has(kHasMovable); }
@@ -55,39 +58,39 @@ class AccessorWriter {
   const bool m_implementsIObject;
 };
 
-constexpr std::string_view kConstFinal = "static_cast<const typename BC::FinalClass*>(this)";
-constexpr std::string_view kFinal = "static_cast<typename BC::FinalClass*>(this)";
-
-std::string AccessorWriter::ReadBarrier(const std::string& name, const std::string& expression) const {
-  if (m_access == Access::Struct) return {};
+void AccessorWriter::WriteReadBarrier(const std::string& name, const std::string& expression) {
+  if (m_access == Access::Struct) return;
   if (m_access == Access::Operations) {
-    return "vesk::IndepFieldReadBarrier(" + std::string(kConstFinal) + "," + PathCall(name) + "); ";
+    Write(m_out, "vesk::IndepFieldReadBarrier($object$,Get$name$Path($arguments$)); ", "object"_ = kConstFinal,
+          "name"_ = name, "arguments"_ = m_path.Arguments());
+    return;
   }
-  return "vesk::DataSourceReadBarrier(&" + expression + "," +
-         std::string(m_implementsIObject ? kConstFinal : "vesk::null") + ",\"" + m_model.name + "::" + expression +
-         "\"); ";
+  Write(m_out, R"(vesk::DataSourceReadBarrier(&$expression$,$object$,"$model$::$expression$"); )",
+        "expression"_ = expression, "object"_ = m_implementsIObject ? kConstFinal : "vesk::null",
+        "model"_ = m_model.name);
 }
 
-std::string AccessorWriter::WriteBarrier(const std::string& expression) const {
-  if (m_access != Access::Barriers) return {};
-  return "vesk::DataSourceWriteBarrier(&" + expression + "," +
-         std::string(m_implementsIObject ? kFinal : "vesk::null") + ",\"" + m_model.name + "::" + expression + "\"); ";
+void AccessorWriter::WriteWriteBarrier(const std::string& expression) {
+  if (m_access != Access::Barriers) return;
+  Write(m_out, R"(vesk::DataSourceWriteBarrier(&$expression$,$object$,"$model$::$expression$"); )",
+        "expression"_ = expression, "object"_ = m_implementsIObject ? kFinal : "vesk::null", "model"_ = m_model.name);
 }
 
-std::string AccessorWriter::GenopCall(std::string_view function, const std::string& name, const std::string& expression,
-                                      std::string_view rest) const {
-  return "vesk::" + std::string(function) + "(" + std::string(kFinal) + "," + PathCall(name) + "," + expression +
-         std::string(rest);
+void AccessorWriter::WriteOperation(std::string_view function, const std::string& name, const std::string& expression,
+                                    std::string_view arguments) {
+  Write(m_out, "vesk::$function$($object$,Get$name$Path($path$),$expression$,$arguments$);", "function"_ = function,
+        "object"_ = kFinal, "name"_ = name, "path"_ = m_path.Arguments(), "expression"_ = expression,
+        "arguments"_ = arguments);
 }
 
 void AccessorWriter::WritePathFunctions(const std::string& name) {
   const std::string parameters = m_path.Parameters();
-  const std::string arguments = m_path.Arguments();
-  const std::string_view comma = parameters.empty() ? "" : ",";
-  m_out << "static void Get" << name << "Path(vesk::Path& _path" << comma << parameters << ") { " << m_path.Body()
-        << "}\n";
-  m_out << "static vesk::Path Get" << name << "Path(" << parameters << ") { vesk::Path _path; Get" << name
-        << "Path(_path" << comma << arguments << "); return _path; }\n";
+  Write(m_out, R"(
+    static void Get$name$Path(vesk::Path& _path$further$) { $body$}
+    static vesk::Path Get$name$Path($parameters$) { vesk::Path _path; Get$name$Path($pathAndArguments$); return _path; }
+  )",
+        "name"_ = name, "further"_ = parameters.empty() ? "" : "," + parameters, "body"_ = m_path.Body(),
+        "parameters"_ = parameters, "pathAndArguments"_ = parameters.empty() ? "_path" : "_path," + m_path.Arguments());
 }
 
 void AccessorWriter::WriteField(PathElement element, TypeView type, const std::string& name,
@@ -95,11 +98,14 @@ void AccessorWriter::WriteField(PathElement element, TypeView type, const std::s
   m_path.Push(std::move(element));
   m_out << "\n";
   WritePathFunctions(name);
-  WriteText(m_out,
-            "$0 const& _model__$1($2) const { return $3; }\n"
-            "$0& _model__$1($2) { return $3; }\n"
-            "$0 const& Get$1($2) const { $4return $3; }\n",
-            {TypeText(type), name, m_path.Parameters(), expression, ReadBarrier(name, expression)});
+  Write(
+      m_out, R"(
+    $type$ const& _model__$name$($parameters$) const { return $expression$; }
+    $type$& _model__$name$($parameters$) { return $expression$; }
+    $type$ const& Get$name$($parameters$) const { $barrier$return $expression$; }
+  )",
+      "type"_ = TypeText(type), "name"_ = name, "parameters"_ = m_path.Parameters(), "expression"_ = expression,
+      "barrier"_ = [&] { WriteReadBarrier(name, expression); });
   WriteByType(type, name, expression);
   m_path.Pop();
 }
@@ -139,32 +145,9 @@ void AccessorWriter::WriteByType(TypeView type, const std::string& name, const s
   }
 }
 
-void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
-  const std::string parameters = m_path.Parameters();
-  if (m_access != Access::Operations) {
-    WriteText(m_out, "$0& Write$1($2) { $3 return $4; }\n",
-              {TypeText(type), name, parameters, WriteBarrier(expression), expression});
-  }
-  m_out << "void Set" << name << "(" << WithComma(parameters) << ConstReferenceText(type, "_v") << ") { ";
-  if (m_access == Access::Operations) {
-    const std::string_view function = IsMovable(type)                 ? "genop_AssignPref"
-                                      : NeedsVisitPrefs(type, m_root) ? "genop_Assign_VisitPrefs"
-                                                                      : "genop_Assign";
-    m_out << GenopCall(function, name, expression, ",_v);");
-  } else {
-    m_out << WriteBarrier(expression) << expression << " = _v;";
-  }
-  m_out << " }\n";
-}
-
-void AccessorWriter::WriteOffset(TypeView type, const std::string& name, const std::string& expression) {
-  m_out << "void Offset" << name << "(" << WithComma(m_path.Parameters()) << ConstReferenceText(type, "_v") << ") { ";
-  if (m_access == Access::Operations) {
-    m_out << GenopCall("genop_OffsetValue", name, expression, ",_v);");
-  } else {
-    m_out << WriteBarrier(expression) << expression << " += _v;";
-  }
-  m_out << " }\n";
+std::string_view AccessorWriter::AssignOperation(TypeView type) const {
+  if (IsMovable(type)) return "genop_AssignPref";
+  return NeedsVisitPrefs(type, m_root) ? "genop_Assign_VisitPrefs" : "genop_Assign";
 }
 
 std::string AccessorWriter::VectorOperation(std::string_view verb, TypeView element) const {
@@ -173,34 +156,74 @@ std::string AccessorWriter::VectorOperation(std::string_view verb, TypeView elem
   return function + (NeedsVisitPrefs(element, m_root) ? "Vector_VisitPrefs" : "Vector");
 }
 
+void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
+  const std::string parameters = m_path.Parameters();
+  auto writeBarrier = [&] { WriteWriteBarrier(expression); };
+  if (m_access != Access::Operations) {
+    Write(m_out, "$type$& Write$name$($parameters$) { $barrier$ return $expression$; }\n", "type"_ = type,
+          "name"_ = name, "parameters"_ = parameters, "barrier"_ = writeBarrier, "expression"_ = expression);
+  }
+  auto writeAssignment = [&] {
+    if (m_access == Access::Operations) return WriteOperation(AssignOperation(type), name, expression, "_v");
+    Write(m_out, "$barrier$$expression$ = _v;", "barrier"_ = writeBarrier, "expression"_ = expression);
+  };
+  Write(m_out, "void Set$name$($parameters$$value$) { $assignment$ }\n", "name"_ = name,
+        "parameters"_ = WithComma(parameters), "value"_ = ConstReferenceText(type, "_v"),
+        "assignment"_ = writeAssignment);
+}
+
+void AccessorWriter::WriteOffset(TypeView type, const std::string& name, const std::string& expression) {
+  auto writeAddition = [&] {
+    if (m_access == Access::Operations) return WriteOperation("genop_OffsetValue", name, expression, "_v");
+    Write(
+        m_out, "$barrier$$expression$ += _v;", "barrier"_ = [&] { WriteWriteBarrier(expression); },
+        "expression"_ = expression);
+  };
+  Write(m_out, "void Offset$name$($parameters$$value$) { $addition$ }\n", "name"_ = name,
+        "parameters"_ = WithComma(m_path.Parameters()), "value"_ = ConstReferenceText(type, "_v"),
+        "addition"_ = writeAddition);
+}
+
 void AccessorWriter::WriteVector(TypeView element, const std::string& name, const std::string& expression) {
-  const std::string parameters = WithComma(m_path.Parameters());
-  WriteText(m_out, "void CreateInto$0($1vesk::ssize_t _i,$2 const* _src,vesk::ssize_t _n)\n",
-            {name, parameters, TypeText(element)});
-  {
-    Block body(m_out);
+  auto writeBarrier = [&] { WriteWriteBarrier(expression); };
+  auto writeInsertion = [&] {
     if (m_access == Access::Operations) {
-      m_out << GenopCall(VectorOperation("CreateInto", element), name, expression, ",_i,_src,_n);\n");
+      WriteOperation(VectorOperation("CreateInto", element), name, expression, "_i,_src,_n");
     } else {
-      WriteText(m_out, "$0$1.insert($1.begin()+_i,_src,_src+_n);\n", {WriteBarrier(expression), expression});
+      Write(m_out, "$barrier$$expression$.insert($expression$.begin()+_i,_src,_src+_n);", "barrier"_ = writeBarrier,
+            "expression"_ = expression);
     }
-  }
-  WriteText(m_out, "void DeleteFrom$0($1vesk::ssize_t _i1,vesk::ssize_t _i2)\n", {name, parameters});
-  Block body(m_out);
-  if (m_access == Access::Operations) {
-    m_out << GenopCall(VectorOperation("DeleteFrom", element), name, expression, ",_i1,_i2);\n");
-  } else {
-    WriteText(m_out, "$0$1.erase(_i1,_i2-_i1);\n", {WriteBarrier(expression), expression});
-  }
+    m_out << "\n";
+  };
+  auto writeErasure = [&] {
+    if (m_access == Access::Operations) {
+      WriteOperation(VectorOperation("DeleteFrom", element), name, expression, "_i1,_i2");
+    } else {
+      Write(m_out, "$barrier$$expression$.erase(_i1,_i2-_i1);", "barrier"_ = writeBarrier, "expression"_ = expression);
+    }
+    m_out << "\n";
+  };
+  Write(m_out, R"(
+    void CreateInto$name$($parameters$vesk::ssize_t _i,$element$ const* _src,vesk::ssize_t _n)
+    {
+        $insertion$
+    }
+    void DeleteFrom$name$($parameters$vesk::ssize_t _i1,vesk::ssize_t _i2)
+    {
+        $erasure$
+    }
+  )",
+        "name"_ = name, "parameters"_ = WithComma(m_path.Parameters()), "element"_ = element,
+        "insertion"_ = writeInsertion, "erasure"_ = writeErasure);
 }
 
 void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const std::string& expression) {
   if (IsMovable(key) && m_access == Access::Operations) {
-    const std::string parameters = WithComma(m_path.Parameters());
     for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {
-      WriteText(m_out, "bool $0$1($2$3 const& _v) { return $4 }\n",
-                {verb, name, parameters, TypeText(key),
-                 GenopCall("genop_" + std::string(verb) + "MSet", name, expression, ",_v);")});
+      auto writeOperation = [&] { WriteOperation("genop_" + std::string(verb) + "MSet", name, expression, "_v"); };
+      Write(m_out, "bool $verb$$name$($parameters$$key$ const& _v) { return $operation$ }\n", "verb"_ = verb,
+            "name"_ = name, "parameters"_ = WithComma(m_path.Parameters()), "key"_ = key,
+            "operation"_ = writeOperation);
     }
     return;
   }
@@ -209,13 +232,17 @@ void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const st
   m_path.Push(PathElement::Key(key));
   WritePathFunctions(element);
   auto write = [&](std::string_view verb, std::string_view operation, std::string_view member) {
-    WriteText(m_out, "bool $0$1($2) { ", {verb, name, m_path.Parameters()});
-    if (m_access == Access::Operations) {
-      m_out << "return " << GenopCall(operation, element, expression, "," + index + ");");
-    } else {
-      WriteText(m_out, "$0return $1.$2($3);", {WriteBarrier(expression), expression, member, index});
-    }
-    m_out << " }\n";
+    auto writeReturn = [&] {
+      if (m_access == Access::Operations) {
+        m_out << "return ";
+        return WriteOperation(operation, element, expression, index);
+      }
+      Write(
+          m_out, "$barrier$return $expression$.$member$($index$);", "barrier"_ = [&] { WriteWriteBarrier(expression); },
+          "expression"_ = expression, "member"_ = member, "index"_ = index);
+    };
+    Write(m_out, "bool $verb$$name$($parameters$) { $return$ }\n", "verb"_ = verb, "name"_ = name,
+          "parameters"_ = m_path.Parameters(), "return"_ = writeReturn);
   };
   write("InsertInto", "genop_SetInsert", "Insert");
   write("DeleteFrom", "genop_SetDelete", "Delete");
@@ -225,11 +252,11 @@ void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const st
 }  // namespace
 
 void WriteModelStructAccessors(TextWriter& out, const ClassDef& def) {
-  AccessorWriter(out, def, Access::Struct, def.m_implementsIObject).Write();
+  AccessorWriter(out, def, Access::Struct, def.m_implementsIObject).WriteAll();
 }
 
 void WriteModelMixinAccessors(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
-  AccessorWriter(out, model, access, def.m_implementsIObject).Write();
+  AccessorWriter(out, model, access, def.m_implementsIObject).WriteAll();
 }
 
 void WriteModelMixinAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
