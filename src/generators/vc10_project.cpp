@@ -1,12 +1,12 @@
 #include "generators/vc10_project.h"
 
 #include <algorithm>
-#include <optional>
 #include <span>
 #include <vector>
 
 #include "generators/common.h"
 #include "generators/vs_common.h"
+#include "generators/xml.h"
 #include "text/numbers.h"
 #include "text/paths.h"
 #include "workspace/switch_tables.h"
@@ -124,35 +124,14 @@ ItemList ItemsOf(const Project& project, Form form) {
 
 // --- Writing
 
-// An element on lines of its own; what is written until the scope ends is its body.
-class Element {
- public:
-  Element(TextWriter& out, std::string_view name, std::string_view attributes = {}) : m_out(out), m_name(name) {
-    m_out << "<" << m_name << (attributes.empty() ? "" : " ") << attributes << ">\n";
-    m_indent.emplace(m_out, 2);
-  }
-  ~Element() {
-    m_indent.reset();
-    m_out << "</" << m_name << ">\n";
-  }
-
- private:
-  TextWriter& m_out;
-  std::string_view m_name;
-  std::optional<IndentScope> m_indent;
-};
-
-std::string Attribute(std::string_view name, std::string_view value) {
-  return std::string(name).append("=\"").append(value).append("\"");
-}
-
 std::string Condition(const ProjectConfig& config) {
-  return Attribute("Condition", "'$(Configuration)|$(Platform)'=='" + ConfigSpec(config) + "'");
+  return "'$(Configuration)|$(Platform)'=='" + ConfigSpec(config) + "'";
 }
 
 class ProjectWriter {
  public:
-  ProjectWriter(TextWriter& out, Project& project, Form form) : m_out(out), m_project(project), m_form(form) {}
+  ProjectWriter(TextWriter& out, Project& project, Form form)
+      : m_xml(out, XmlLayout::Blanks), m_project(project), m_form(form) {}
   void Write();
 
  private:
@@ -170,100 +149,91 @@ class ProjectWriter {
   void WriteFiles();
   void WriteSource(const Item& item);
   void WriteAssemblerFile(const Item& item);
+  void WriteReferences();
   void WriteReference(const std::string& subproject);
 
   // Pieces of all tools
-  void WriteValue(std::string_view element, std::string_view value);
   void WriteConditional(std::string_view element, const ProjectConfig& config, std::string_view value);
   void WriteInherited(std::string_view element, std::string_view value, std::string_view separator);
   void WriteDirectory(const OptionMap& options, const std::string& property, std::string_view element);
   bool WriteEnumerated(const OptionMap& options, const EnumeratedOption& option);
   void WriteIncludes(const ProjectConfig& config, std::string_view value);
 
-  TextWriter& m_out;
+  XmlWriter m_xml;
   Project& m_project;
   const Form m_form;
 };
 
 void ProjectWriter::Write() {
   for (const auto& config : m_project.configs) config->linkerOptions = LinkerOptions(m_project, *config);
-  m_out << kHead;
-  const std::string version(CompilerOf(m_project.settings->compiler).projectVersion);
-  Element project(
-      m_out, "Project",
-      R"(DefaultTargets="Build" )" + Attribute("ToolsVersion", version) + " " + Attribute("xmlns", kNameSpace));
+  const XmlElement project(m_xml, "Project",
+                           {{"DefaultTargets", "Build"},
+                            {"ToolsVersion", CompilerOf(m_project.settings->compiler).projectVersion},
+                            {"xmlns", kNameSpace}});
   WriteConfigurations();
   {
-    Element globals(m_out, "PropertyGroup", R"(Label="Globals")");
-    WriteValue("ProjectGuid", GuidText(m_project.guid));
+    const XmlElement globals(m_xml, "PropertyGroup", {{"Label", "Globals"}});
+    m_xml.Value("ProjectGuid", GuidText(m_project.guid));
   }
-  m_out << R"(<Import Project="$(VCTargetsPath)\Microsoft.Cpp.Default.props" />
-)";
+  m_xml.Empty("Import", {{"Project", R"($(VCTargetsPath)\Microsoft.Cpp.Default.props)"}});
   for (const auto& config : m_project.configs) WriteConfigurationGroup(*config);
-  m_out << R"(<Import Project="$(VCTargetsPath)\Microsoft.Cpp.props" />
-<ImportGroup Label="ExtensionSettings">
-</ImportGroup>
-)";
+  m_xml.Empty("Import", {{"Project", R"($(VCTargetsPath)\Microsoft.Cpp.props)"}});
+  { const XmlElement extensions(m_xml, "ImportGroup", {{"Label", "ExtensionSettings"}}); }
   for (const auto& config : m_project.configs) WritePropertySheets(*config);
-  m_out << R"(<PropertyGroup Label="UserMacros" />
-<PropertyGroup>
-  <_ProjectFileVersion>11.0.50727.1</_ProjectFileVersion>
-</PropertyGroup>
-)";
+  m_xml.Empty("PropertyGroup", {{"Label", "UserMacros"}});
+  {
+    const XmlElement version(m_xml, "PropertyGroup");
+    m_xml.Value("_ProjectFileVersion", "11.0.50727.1");
+  }
   for (const auto& config : m_project.configs) WriteOutputs(*config);
   for (const auto& config : m_project.configs) WriteTools(*config);
   WriteFiles();
-  if (!m_project.subprojects.empty()) {
-    Element references(m_out, "ItemGroup");
-    for (const std::string& subproject : m_project.subprojects) WriteReference(subproject);
-  }
-  m_out << R"(<Import Project="$(VCTargetsPath)\Microsoft.Cpp.targets" />
-<ImportGroup Label="ExtensionTargets">
-</ImportGroup>
-)";
+  WriteReferences();
+  m_xml.Empty("Import", {{"Project", R"($(VCTargetsPath)\Microsoft.Cpp.targets)"}});
+  const XmlElement extensions(m_xml, "ImportGroup", {{"Label", "ExtensionTargets"}});
 }
 
 void ProjectWriter::WriteConfigurations() {
-  Element group(m_out, "ItemGroup", R"(Label="ProjectConfigurations")");
+  const XmlElement group(m_xml, "ItemGroup", {{"Label", "ProjectConfigurations"}});
   for (const auto& config : m_project.configs) {
-    Element item(m_out, "ProjectConfiguration", Attribute("Include", ConfigSpec(*config)));
-    WriteValue("Configuration", config->name);
-    WriteValue("Platform", config->platform);
+    const XmlElement item(m_xml, "ProjectConfiguration", {{"Include", ConfigSpec(*config)}});
+    m_xml.Value("Configuration", config->name);
+    m_xml.Value("Platform", config->platform);
   }
 }
 
 void ProjectWriter::WriteConfigurationGroup(const ProjectConfig& config) {
-  Element group(m_out, "PropertyGroup", Condition(config) + R"( Label="Configuration")");
-  WriteValue("ConfigurationType", ConfigurationType(m_project.targetType));
+  const XmlElement group(m_xml, "PropertyGroup", {{"Condition", Condition(config)}, {"Label", "Configuration"}});
+  m_xml.Value("ConfigurationType", ConfigurationType(m_project.targetType));
   const std::string_view toolset = CompilerOf(m_project.settings->compiler).toolset;
   if (!toolset.empty()) {
-    WriteValue("PlatformToolset", std::string(toolset) + (m_project.settings->targetXP ? "_xp" : ""));
+    m_xml.Value("PlatformToolset", std::string(toolset) + (m_project.settings->targetXP ? "_xp" : ""));
   }
   for (const EnumeratedOption& option : kConfigurationOptions) WriteEnumerated(config.generalOptions, option);
   if (!WriteEnumerated(config.generalOptions, kManagedOption)) WriteEnumerated(config.compilerOptions, kManagedOption);
 }
 
 void ProjectWriter::WritePropertySheets(const ProjectConfig& config) {
-  Element group(m_out, "ImportGroup", Condition(config) + R"( Label="PropertySheets")");
-  m_out << R"xml(<Import Project="$(UserRootDir)\Microsoft.Cpp.$(Platform).user.props")xml"
-        << R"xml( Condition="exists('$(UserRootDir)\Microsoft.Cpp.$(Platform).user.props')")xml"
-        << R"xml( Label="LocalAppDataPlatform" />)xml"
-        << "\n";
+  const XmlElement group(m_xml, "ImportGroup", {{"Condition", Condition(config)}, {"Label", "PropertySheets"}});
+  static constexpr std::string_view kSheet = R"($(UserRootDir)\Microsoft.Cpp.$(Platform).user.props)";
+  m_xml.Empty(
+      "Import",
+      {{"Project", kSheet}, {"Condition", "exists('" + std::string(kSheet) + "')"}, {"Label", "LocalAppDataPlatform"}});
 }
 
 void ProjectWriter::WriteOutputs(const ProjectConfig& config) {
-  Element group(m_out, "PropertyGroup", Condition(config));
+  const XmlElement group(m_xml, "PropertyGroup", {{"Condition", Condition(config)}});
   WriteDirectory(config.generalOptions, "IntermediateDirectory", "IntDir");
   WriteDirectory(config.generalOptions, "OutputDirectory", "OutDir");
   WriteEnumerated(config.linkerOptions, kIncrementalOption);
   if (auto manifest = config.linkerOptions.find("GenerateManifest"); manifest != config.linkerOptions.end()) {
-    WriteValue("GenerateManifest", manifest->second == "0" || manifest->second == "false" ? "false" : "true");
+    m_xml.Value("GenerateManifest", manifest->second == "0" || manifest->second == "false" ? "false" : "true");
   }
-  if (m_form == Form::Translated) WriteValue("TargetName", m_project.name);
+  if (m_form == Form::Translated) m_xml.Value("TargetName", m_project.name);
 }
 
 void ProjectWriter::WriteTools(const ProjectConfig& config) {
-  Element group(m_out, "ItemDefinitionGroup", Condition(config));
+  const XmlElement group(m_xml, "ItemDefinitionGroup", {{"Condition", Condition(config)}});
   if (m_project.targetType == TargetType::UtilityProject) return;
   WriteCompilerTool(config);
   WriteResourceTool(config);
@@ -277,20 +247,20 @@ void ProjectWriter::WriteTools(const ProjectConfig& config) {
 // --- Compiler and resource compiler
 
 void ProjectWriter::WriteCompilerTool(const ProjectConfig& config) {
-  Element tool(m_out, "ClCompile");
+  const XmlElement tool(m_xml, "ClCompile");
   for (const auto& [property, value] : config.compilerOptions) WriteCompilerOption(config, property, value);
-  WriteValue("PrecompiledHeaderFile", "StdAfx.h");
+  m_xml.Value("PrecompiledHeaderFile", "StdAfx.h");
 }
 
 // Properties that have no place in this format disappear silently.
 void ProjectWriter::WriteCompilerOption(const ProjectConfig& config, const std::string& property,
                                         const std::string& value) {
   if (FindProperty(kSignedFlags, property) || FindProperty(kFlags, property)) {
-    WriteValue(ElementName(kCompilerElements, property), value);
+    m_xml.Value(ElementName(kCompilerElements, property), value);
   } else if (FindProperty(kEnumerated, property)) {
     if (property == "ManagedExtensions") return;  // stands in the configuration group
     const EnumeratedSwitch* row = FindValue(kEnumerated, property, value);
-    if (row && !row->valueName.empty()) WriteValue(property, row->valueName);
+    if (row && !row->valueName.empty()) m_xml.Value(property, row->valueName);
   } else if (property == "AdditionalIncludeDirectories") {
     WriteIncludes(config, value);
   } else if (property == "AdditionalOptions") {
@@ -298,12 +268,12 @@ void ProjectWriter::WriteCompilerOption(const ProjectConfig& config, const std::
   } else if (FindProperty(kLists, property)) {
     WriteInherited(property, value, ";");
   } else if (property == "ProgramDataBaseFileName" || property == "ObjectFile" || property == "PrecompiledHeaderFile") {
-    WriteValue(ElementName(kCompilerElements, property), value);
+    m_xml.Value(ElementName(kCompilerElements, property), value);
   }
 }
 
 void ProjectWriter::WriteResourceTool(const ProjectConfig& config) {
-  Element tool(m_out, "ResourceCompile");
+  const XmlElement tool(m_xml, "ResourceCompile");
   for (const auto& [property, value] : config.resourceOptions) {
     if (property == "AdditionalIncludeDirectories") {
       WriteIncludes(config, value);
@@ -320,7 +290,7 @@ void ProjectWriter::WriteResourceTool(const ProjectConfig& config) {
 // The list properties and the libraries, which both tools have.
 bool ProjectWriter::WriteLinkerOption(std::string_view property, std::string_view value) {
   if (FindProperty(kLinkerLists, property) || property == "AdditionalOptions") {
-    WriteValue(property, value);
+    m_xml.Value(property, value);
     return true;
   }
   if (property != "AdditionalDependencies") return false;
@@ -329,10 +299,10 @@ bool ProjectWriter::WriteLinkerOption(std::string_view property, std::string_vie
 }
 
 void ProjectWriter::WriteLibrarianTool(const ProjectConfig& config) {
-  Element tool(m_out, "Lib");
+  const XmlElement tool(m_xml, "Lib");
   for (const auto& [property, value] : config.linkerOptions) {
     if (FindProperty(kLibrarianFlags, property) || FindProperty(kLibrarianValues, property)) {
-      WriteValue(property, value);
+      m_xml.Value(property, value);
     } else if (!WriteLinkerOption(property, value)) {
       TraceWriter() << "todo : librarian switch " << property << " = " << value << "\n";
     }
@@ -340,18 +310,18 @@ void ProjectWriter::WriteLibrarianTool(const ProjectConfig& config) {
 }
 
 void ProjectWriter::WriteLinkerTool(const ProjectConfig& config) {
-  Element tool(m_out, "Link");
+  const XmlElement tool(m_xml, "Link");
   for (const auto& [property, value] : config.linkerOptions) {
     if (property == "LinkIncremental" || property == "GenerateManifest") continue;  // stand with the outputs
     if (const EnumeratedSwitch* row = FindValue(kLinkerEnumerated, property, value)) {
       if (row->valueName.empty()) {
         TraceWriter() << "VS2012 has no mapping for linker switch " << property << " = " << value << "\n";
       } else {
-        WriteValue(ElementName(kLinkerElements, property), row->valueName);
+        m_xml.Value(ElementName(kLinkerElements, property), row->valueName);
       }
     } else if (FindProperty(kLinkerFlags, property) || FindProperty(kLinkerValues, property) ||
                property == "MapFileName") {
-      WriteValue(ElementName(kLinkerElements, property), value);
+      m_xml.Value(ElementName(kLinkerElements, property), value);
     } else if (!WriteLinkerOption(property, value)) {
       TraceWriter() << "todo : linker switch " << property << " = " << value << "\n";
     }
@@ -361,7 +331,7 @@ void ProjectWriter::WriteLinkerTool(const ProjectConfig& config) {
 // --- Files and references
 
 void ProjectWriter::WriteFiles() {
-  Element group(m_out, "ItemGroup");
+  const XmlElement group(m_xml, "ItemGroup");
   for (const Item& item : ItemsOf(m_project, m_form).items) {
     const std::string_view name = item.file ? ItemName(*item.file) : "None";
     if (name == "ClCompile") {
@@ -369,13 +339,13 @@ void ProjectWriter::WriteFiles() {
     } else if (name == "CustomBuild") {
       WriteAssemblerFile(item);
     } else {
-      m_out << "<" << name << " " << Attribute("Include", item.path) << " />\n";
+      m_xml.Empty(name, {{"Include", item.path}});
     }
   }
 }
 
 void ProjectWriter::WriteSource(const Item& item) {
-  Element source(m_out, "ClCompile", Attribute("Include", item.path));
+  const XmlElement source(m_xml, "ClCompile", {{"Include", item.path}});
   std::string_view use = "2";
   if (!item.file->configRecords.empty()) {
     const OptionMap& options = item.file->configRecords.front()->options;
@@ -392,7 +362,7 @@ void ProjectWriter::WriteSource(const Item& item) {
 }
 
 void ProjectWriter::WriteAssemblerFile(const Item& item) {
-  Element file(m_out, "CustomBuild", Attribute("Include", item.path));
+  const XmlElement file(m_xml, "CustomBuild", {{"Include", item.path}});
   for (const auto& config : m_project.configs) {
     const bool isWin64 = config->platform == "Win64";
     WriteConditional(
@@ -405,32 +375,36 @@ void ProjectWriter::WriteAssemblerFile(const Item& item) {
   }
 }
 
+void ProjectWriter::WriteReferences() {
+  if (m_project.subprojects.empty()) return;
+  const XmlElement group(m_xml, "ItemGroup");
+  for (const std::string& subproject : m_project.subprojects) WriteReference(subproject);
+}
+
 void ProjectWriter::WriteReference(const std::string& subproject) {
   const Project* dependency = FindDependency(m_project, subproject);
   if (!dependency || dependency->exported) return;
   const std::string prefix(NamePrefix(FormOf(*dependency, m_form)));
-  Element reference(m_out, "ProjectReference", Attribute("Include", prefix + dependency->name + ".vcxproj"));
-  WriteValue("Project", GuidText(dependency->guid));
-  WriteValue("ReferenceOutputAssembly", "false");
+  const XmlElement reference(m_xml, "ProjectReference", {{"Include", prefix + dependency->name + ".vcxproj"}});
+  m_xml.Value("Project", GuidText(dependency->guid));
+  m_xml.Value("ReferenceOutputAssembly", "false");
 }
 
 // --- Pieces
 
-void ProjectWriter::WriteValue(std::string_view element, std::string_view value) {
-  m_out << "<" << element << ">" << value << "</" << element << ">\n";
-}
-
 void ProjectWriter::WriteConditional(std::string_view element, const ProjectConfig& config, std::string_view value) {
-  m_out << "<" << element << " " << Condition(config) << ">" << value << "</" << element << ">\n";
+  m_xml.Value(element, value, {{"Condition", Condition(config)}});
 }
 
 // A value ahead of what the property sheets give.
 void ProjectWriter::WriteInherited(std::string_view element, std::string_view value, std::string_view separator) {
-  m_out << "<" << element << ">" << value << separator << "%(" << element << ")</" << element << ">\n";
+  std::string text(value);
+  text.append(separator).append("%(").append(element).append(")");
+  m_xml.Value(element, text);
 }
 
 void ProjectWriter::WriteDirectory(const OptionMap& options, const std::string& property, std::string_view element) {
-  if (auto found = options.find(property); found != options.end()) WriteValue(element, found->second + "/");
+  if (auto found = options.find(property); found != options.end()) m_xml.Value(element, found->second + "/");
 }
 
 // True when the map holds the option, also with an index that has no name.
@@ -440,7 +414,7 @@ bool ProjectWriter::WriteEnumerated(const OptionMap& options, const EnumeratedOp
   uint64_t index;
   std::string error;
   if (ParseNumber(found->second, index, error) && index < option.names.size()) {
-    WriteValue(option.element, option.names[index]);
+    m_xml.Value(option.element, option.names[index]);
   } else {
     TraceWriter() << option.property << " index = " << found->second << " out of range\n";
   }
@@ -453,20 +427,24 @@ void ProjectWriter::WriteIncludes(const ProjectConfig& config, std::string_view 
 
 }  // namespace
 
-void WriteVc10Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).Write(); }
+void WriteVc10Project(TextWriter& out, Project& project, Form form) {
+  out << kHead;
+  ProjectWriter(out, project, form).Write();
+}
 
 void WriteVc10Filters(TextWriter& out, Project& project, Form form) {
   const ItemList list = ItemsOf(project, form);
   out << kHead;
-  Element root(out, "Project", R"(ToolsVersion="4.0" )" + Attribute("xmlns", kNameSpace));
+  XmlWriter xml(out, XmlLayout::Blanks);
+  const XmlElement root(xml, "Project", {{"ToolsVersion", "4.0"}, {"xmlns", kNameSpace}});
   {
-    Element group(out, "ItemGroup");
-    for (const std::string& filter : list.filters) Element(out, "Filter", Attribute("Include", filter));
+    const XmlElement group(xml, "ItemGroup");
+    for (const std::string& filter : list.filters) XmlElement(xml, "Filter", {{"Include", filter}});
   }
-  Element group(out, "ItemGroup");
+  const XmlElement group(xml, "ItemGroup");
   for (const Item& item : list.items) {
-    Element element(out, item.file ? ItemName(*item.file) : "None", Attribute("Include", item.path));
-    if (!item.filter.empty()) out << "<Filter>" << item.filter << "</Filter>\n";
+    const XmlElement element(xml, item.file ? ItemName(*item.file) : "None", {{"Include", item.path}});
+    if (!item.filter.empty()) xml.Value("Filter", item.filter);
   }
 }
 

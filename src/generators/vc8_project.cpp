@@ -5,14 +5,13 @@
 
 #include "generators/common.h"
 #include "generators/vs_common.h"
+#include "generators/xml.h"
 #include "text/numbers.h"
 #include "text/paths.h"
 
 namespace qrex {
 
 namespace {
-
-std::string Tabs(int count) { return std::string(static_cast<size_t>(count), '\t'); }
 
 std::string Backslashed(std::string_view path) {
   std::string text;
@@ -28,7 +27,7 @@ std::string_view ConfigurationType(TargetType type) {
 class ProjectWriter {
  public:
   ProjectWriter(TextWriter& out, Project& project, Form form)
-      : m_out(out),
+      : m_xml(out, XmlLayout::AttributeLines),
         m_project(project),
         m_form(form),
         m_filesBase(IsTranslatedForm(project, form) ? "qrexsource/$(PlatformName)/$(ConfigurationName)"
@@ -37,51 +36,44 @@ class ProjectWriter {
 
  private:
   void WritePlatforms();
+  void WriteToolFiles();
+  void WriteConfigurations();
   void WriteConfiguration(const ProjectConfig& config);
   void WriteEvent(const BuildEvent& event, std::string_view tool);
+  void WriteTools(const ProjectConfig& config);
   void WriteTool(std::string_view tool, const OptionMap& options, const ProjectConfig& config);
-  void WriteFolder(const ProjectFolder& folder, int depth);
-  void WriteFile(const ProjectFile& file, int depth);
-  void WriteFileConfiguration(const ProjectFile& file, const ProjectConfig& config, int depth);
-  void WriteAssemblerTool(const ProjectConfig& config, int depth);
-  void OpenFile(const std::string& path, int depth);
-  void WriteAttribute(int depth, std::string_view name, std::string_view value);
-  void WriteAttributes(int depth, const OptionMap& options);
+  void WriteFolder(const ProjectFolder& folder);
+  void WriteFile(const ProjectFile& file);
+  void WriteFileConfiguration(const ProjectFile& file, const ProjectConfig& config);
+  void WriteCompilerTool(const FileConfigRecord* record, const ProjectConfig& config);
+  void WriteAssemblerTool(const ProjectConfig& config);
 
-  TextWriter& m_out;
+  XmlWriter m_xml;
   Project& m_project;
   const Form m_form;
   const std::string m_filesBase;
 };
 
+void AddAttributes(std::vector<XmlAttribute>& attributes, const OptionMap& options) {
+  for (const auto& [property, value] : options) attributes.push_back({property, value});
+}
+
 void ProjectWriter::Write() {
   m_project.CollectFiles();
-  m_out << "<?xml version=\"1.0\" encoding=\"Windows-1252\"?>\n"
-        << "<VisualStudioProject\n"
-        << "\tProjectType=\"Visual C++\"\n"
-        << "\tVersion=\"" << CompilerOf(m_project.settings->compiler).projectVersion << "\"\n"
-        << "\tName=\"" << m_project.name << "\"\n"
-        << "\tProjectGUID=\"" << GuidText(m_project.guid) << "\"\n"
-        << "\t>\n";
+  const XmlElement project(m_xml, "VisualStudioProject",
+                           {{"ProjectType", "Visual C++"},
+                            {"Version", CompilerOf(m_project.settings->compiler).projectVersion},
+                            {"Name", m_project.name},
+                            {"ProjectGUID", GuidText(m_project.guid)}});
   WritePlatforms();
-  m_out << "\t<ToolFiles>\n";
-  for (const std::string& path : m_project.toolFiles) {
-    m_out << "\t\t<ToolFile\n"
-          << "\t\t\tRelativePath=\"" << Backslashed(path) << "\"\n"
-          << "\t\t/>\n";
+  WriteToolFiles();
+  WriteConfigurations();
+  { const XmlElement references(m_xml, "References"); }
+  {
+    const XmlElement files(m_xml, "Files");
+    WriteFolder(m_project.rootFolder);
   }
-  m_out << "\t</ToolFiles>\n"
-        << "\t<Configurations>\n";
-  for (const auto& config : m_project.configs) WriteConfiguration(*config);
-  m_out << "\t</Configurations>\n"
-        << "\t<References>\n"
-        << "\t</References>\n"
-        << "\t<Files>\n";
-  WriteFolder(m_project.rootFolder, 2);
-  m_out << "\t</Files>\n"
-        << "\t<Globals>\n"
-        << "\t</Globals>\n"
-        << "</VisualStudioProject>\n";
+  const XmlElement globals(m_xml, "Globals");
 }
 
 void ProjectWriter::WritePlatforms() {
@@ -91,138 +83,127 @@ void ProjectWriter::WritePlatforms() {
       platforms.push_back(config->platform);
     }
   }
-  m_out << "\t<Platforms>\n";
-  for (std::string_view platform : platforms) {
-    m_out << "\t\t<Platform\n"
-          << "\t\t\tName=\"" << platform << "\"\n"
-          << "\t\t/>\n";
-  }
-  m_out << "\t</Platforms>\n";
+  const XmlElement element(m_xml, "Platforms");
+  for (std::string_view platform : platforms) m_xml.Empty("Platform", {{"Name", platform}});
+}
+
+void ProjectWriter::WriteToolFiles() {
+  const XmlElement element(m_xml, "ToolFiles");
+  for (const std::string& path : m_project.toolFiles) m_xml.Empty("ToolFile", {{"RelativePath", Backslashed(path)}});
+}
+
+void ProjectWriter::WriteConfigurations() {
+  const XmlElement element(m_xml, "Configurations");
+  for (const auto& config : m_project.configs) WriteConfiguration(*config);
 }
 
 void ProjectWriter::WriteConfiguration(const ProjectConfig& config) {
-  m_out << "\t\t<Configuration\n"
-        << "\t\t\tName=\"" << ConfigSpec(config) << "\"\n";
-  WriteAttributes(3, config.generalOptions);
+  const std::string name = ConfigSpec(config);
+  std::vector<XmlAttribute> attributes = {{"Name", name}};
+  AddAttributes(attributes, config.generalOptions);
   if (!config.generalOptions.contains("ConfigurationType")) {
-    WriteAttribute(3, "ConfigurationType", ConfigurationType(m_project.targetType));
+    attributes.push_back({"ConfigurationType", ConfigurationType(m_project.targetType)});
   }
   if (!config.generalOptions.contains("ManagedExtensions")) {
     auto managed = config.compilerOptions.find("ManagedExtensions");
-    WriteAttribute(3, "ManagedExtensions", managed == config.compilerOptions.end() ? "0" : managed->second);
+    const bool isUnknown = managed == config.compilerOptions.end();
+    attributes.push_back({"ManagedExtensions", isUnknown ? std::string_view("0") : managed->second});
   }
-  m_out << "\t\t\t>\n";
+  const XmlElement element(m_xml, "Configuration", attributes);
   WriteEvent(config.preBuildEvent, "VCPreBuildEventTool");
   WriteEvent(config.preLinkEvent, "VCPreLinkEventTool");
   WriteEvent(config.postBuildEvent, "VCPostBuildEventTool");
-  if (m_project.targetType != TargetType::UtilityProject) {
-    OptionMap compilerOptions = config.compilerOptions;
-    compilerOptions.erase("UsePrecompiledHeader");  // stands at each source
-    compilerOptions.erase("ManagedExtensions");
-    WriteTool("VCCLCompilerTool", compilerOptions, config);
-    WriteTool("VCResourceCompilerTool", config.resourceOptions, config);
-    const bool isArchive = m_project.targetType == TargetType::StaticLibrary;
-    WriteTool(isArchive ? "VCLibrarianTool" : "VCLinkerTool", LinkerOptions(m_project, config), config);
-  }
-  m_out << "\t\t</Configuration>\n";
+  if (m_project.targetType != TargetType::UtilityProject) WriteTools(config);
 }
 
 void ProjectWriter::WriteEvent(const BuildEvent& event, std::string_view tool) {
   if (!event.present) return;
-  m_out << "\t\t\t<Tool\n"
-        << "\t\t\t\tName=\"" << tool << "\"\n"
-        << "\t\t\t\tDescription=\"" << event.description << "\"\n"
-        << "\t\t\t\tCommandLine=\"" << event.commandLine << "\"\n"
-        << "\t\t\t/>\n";
+  m_xml.Empty("Tool", {{"Name", tool}, {"Description", event.description}, {"CommandLine", event.commandLine}});
+}
+
+void ProjectWriter::WriteTools(const ProjectConfig& config) {
+  OptionMap compilerOptions = config.compilerOptions;
+  compilerOptions.erase("UsePrecompiledHeader");  // stands at each source
+  compilerOptions.erase("ManagedExtensions");
+  WriteTool("VCCLCompilerTool", compilerOptions, config);
+  WriteTool("VCResourceCompilerTool", config.resourceOptions, config);
+  const bool isArchive = m_project.targetType == TargetType::StaticLibrary;
+  WriteTool(isArchive ? "VCLibrarianTool" : "VCLinkerTool", LinkerOptions(m_project, config), config);
 }
 
 void ProjectWriter::WriteTool(std::string_view tool, const OptionMap& options, const ProjectConfig& config) {
-  m_out << "\t\t\t<Tool\n"
-        << "\t\t\t\tName=\"" << tool << "\"\n";
+  std::string includes;
+  std::vector<XmlAttribute> attributes = {{"Name", tool}};
   for (const auto& [property, value] : options) {
     const bool isIncludes = property == "AdditionalIncludeDirectories";
-    WriteAttribute(4, property, isIncludes ? IncludeList(m_project, config, value, m_form) : value);
+    if (isIncludes) includes = IncludeList(m_project, config, value, m_form);
+    attributes.push_back({property, isIncludes ? includes : value});
   }
-  m_out << "\t\t\t/>\n";
+  m_xml.Empty("Tool", attributes);
 }
 
 // --- Files
 
-void ProjectWriter::WriteFolder(const ProjectFolder& folder, int depth) {
+void ProjectWriter::WriteFolder(const ProjectFolder& folder) {
   for (const auto& subfolder : folder.subfolders) {
-    m_out << Tabs(depth) << "<Filter\n"
-          << Tabs(depth) << "\tName=\"" << subfolder->name << "\"\n"
-          << Tabs(depth) << "\t>\n";
+    const XmlElement filter(m_xml, "Filter", {{"Name", subfolder->name}});
     if (HoldsProjectFile(m_project, folder, *subfolder, m_form)) {
-      OpenFile(ProjectFileEntry(m_project, m_filesBase), depth + 1);
-      m_out << Tabs(depth + 1) << "</File>\n";
+      const XmlElement file(m_xml, "File", {{"RelativePath", Backslashed(ProjectFileEntry(m_project, m_filesBase))}});
     }
-    WriteFolder(*subfolder, depth + 1);
-    m_out << Tabs(depth) << "</Filter>\n";
+    WriteFolder(*subfolder);
   }
   for (const ProjectFile* file : folder.files) {
-    if (!IsLeftOut(m_project, *file)) WriteFile(*file, depth);
+    if (!IsLeftOut(m_project, *file)) WriteFile(*file);
   }
 }
 
-void ProjectWriter::WriteFile(const ProjectFile& file, int depth) {
-  OpenFile(PathJoin(m_filesBase, file.path), depth);
+void ProjectWriter::WriteFile(const ProjectFile& file) {
+  const XmlElement element(m_xml, "File", {{"RelativePath", Backslashed(PathJoin(m_filesBase, file.path))}});
   if (file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::Rc ||
       file.kind == FileKind::Asm) {
-    for (const auto& config : m_project.configs) WriteFileConfiguration(file, *config, depth + 1);
+    for (const auto& config : m_project.configs) WriteFileConfiguration(file, *config);
   }
-  m_out << Tabs(depth) << "</File>\n";
 }
 
-void ProjectWriter::WriteFileConfiguration(const ProjectFile& file, const ProjectConfig& config, int depth) {
+void ProjectWriter::WriteFileConfiguration(const ProjectFile& file, const ProjectConfig& config) {
   const FileConfigRecord* record = file.FindRecord(config);
-  m_out << Tabs(depth) << "<FileConfiguration\n" << Tabs(depth) << "\tName=\"" << ConfigSpec(config) << "\"\n";
-  if (file.excluded || (record && record->excluded)) m_out << Tabs(depth) << "\tExcludedFromBuild=\"true\"\n";
-  m_out << Tabs(depth) << "\t>\n" << Tabs(depth) << "\t<Tool\n";
+  const std::string name = ConfigSpec(config);
+  std::vector<XmlAttribute> attributes = {{"Name", name}};
+  if (file.excluded || (record && record->excluded)) attributes.push_back({"ExcludedFromBuild", "true"});
+  const XmlElement element(m_xml, "FileConfiguration", attributes);
   if (file.kind == FileKind::Rc) {
-    WriteAttribute(depth + 2, "Name", "VCResourceCompilerTool");
+    m_xml.Empty("Tool", {{"Name", "VCResourceCompilerTool"}});
   } else if (file.kind == FileKind::Asm) {
-    WriteAssemblerTool(config, depth + 2);
+    WriteAssemblerTool(config);
   } else {
-    WriteAttribute(depth + 2, "Name", "VCCLCompilerTool");
-    OptionMap options = record ? record->options : OptionMap();
-    auto inherited = config.compilerOptions.find("UsePrecompiledHeader");
-    if (inherited != config.compilerOptions.end()) options.insert(*inherited);
-    WriteAttributes(depth + 2, options);
+    WriteCompilerTool(record, config);
   }
-  m_out << Tabs(depth) << "\t/>\n" << Tabs(depth) << "</FileConfiguration>\n";
 }
 
-void ProjectWriter::WriteAssemblerTool(const ProjectConfig& config, int depth) {
+void ProjectWriter::WriteCompilerTool(const FileConfigRecord* record, const ProjectConfig& config) {
+  OptionMap options = record ? record->options : OptionMap();
+  auto inherited = config.compilerOptions.find("UsePrecompiledHeader");
+  if (inherited != config.compilerOptions.end()) options.insert(*inherited);
+  std::vector<XmlAttribute> attributes = {{"Name", "VCCLCompilerTool"}};
+  AddAttributes(attributes, options);
+  m_xml.Empty("Tool", attributes);
+}
+
+void ProjectWriter::WriteAssemblerTool(const ProjectConfig& config) {
   const std::string object =
       R"(&quot;$(ProjectDir)$(PlatformName)\$(ConfigurationName)\$(ProjectName)\$(InputName).obj&quot;)";
   const bool isWin64 = config.platform == "Win64";
-  WriteAttribute(depth, "Name", "VCCustomBuildTool");
-  WriteAttribute(depth, "CommandLine",
-                 std::string("&quot;$(VCInstallDir)bin") + (isWin64 ? R"(\x86_amd64\ml64)" : R"(\ml)") +
-                     "&quot; /c /Cx" + (isWin64 ? " /D _M_X64" : " /coff") + " /Fo " + object +
-                     " &quot;$(InputPath)&quot;");
-  WriteAttribute(depth, "Outputs", object);
-}
-
-void ProjectWriter::OpenFile(const std::string& path, int depth) {
-  m_out << Tabs(depth) << "<File\n"
-        << Tabs(depth) << "\tRelativePath=\"" << Backslashed(path) << "\"\n"
-        << Tabs(depth) << "\t>\n";
-}
-
-// --- Attributes
-
-void ProjectWriter::WriteAttribute(int depth, std::string_view name, std::string_view value) {
-  m_out << Tabs(depth) << name << "=\"" << value << "\"\n";
-}
-
-void ProjectWriter::WriteAttributes(int depth, const OptionMap& options) {
-  for (const auto& [property, value] : options) WriteAttribute(depth, property, value);
+  const std::string command = std::string("&quot;$(VCInstallDir)bin") + (isWin64 ? R"(\x86_amd64\ml64)" : R"(\ml)") +
+                              "&quot; /c /Cx" + (isWin64 ? " /D _M_X64" : " /coff") + " /Fo " + object +
+                              " &quot;$(InputPath)&quot;";
+  m_xml.Empty("Tool", {{"Name", "VCCustomBuildTool"}, {"CommandLine", command}, {"Outputs", object}});
 }
 
 }  // namespace
 
-void WriteVc8Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).Write(); }
+void WriteVc8Project(TextWriter& out, Project& project, Form form) {
+  out << "<?xml version=\"1.0\" encoding=\"Windows-1252\"?>\n";
+  ProjectWriter(out, project, form).Write();
+}
 
 }  // namespace qrex
