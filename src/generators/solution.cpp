@@ -4,6 +4,7 @@
 
 #include "generators/common.h"
 #include "generators/vs_common.h"
+#include "translator/emit/write.h"
 
 namespace qrex {
 
@@ -18,29 +19,35 @@ void WriteDependencies(TextWriter& out, const Project& project) {
   for (const std::string& path : project.subprojects) {
     const Project* dependency = FindDependency(project, path);
     if (!dependency || dependency->exported) continue;
-    out << "\t\t" << GuidText(dependency->guid) << " = " << GuidText(dependency->guid) << "\n";
+    Write(out, "\t\t$guid$ = $guid$\n", "guid"_ = GuidText(dependency->guid));
   }
   out << "\tEndProjectSection\n";
 }
 
 void WriteProject(TextWriter& out, const Project& project, Form form) {
   const bool isNewFormat = CompilerOf(project.settings->compiler).format == ProjectFormat::Vcxproj;
-  out << "Project(\"{8BC9CEB8-8B4A-11D0-8D11-00A0C91BC942}\") = \"" << project.name << "\", \""
-      << NamePrefix(FormOf(project, form)) << project.name << (isNewFormat ? ".vcxproj" : ".vcproj") << "\", \""
-      << GuidText(project.guid) << "\"\n";
-  // The newer project files name their dependencies themselves.
-  if (!isNewFormat && !project.subprojects.empty()) WriteDependencies(out, project);
-  out << "EndProject\n";
+  auto writeDependencies = [&] {
+    // The newer project files name their dependencies themselves.
+    if (!isNewFormat && !project.subprojects.empty()) WriteDependencies(out, project);
+  };
+  Write(out, R"(
+    Project("{8BC9CEB8-8B4A-11D0-8D11-00A0C91BC942}") = "$name$", "$prefix$$name$$extension$", "$guid$"
+    $dependencies$
+    EndProject
+  )",
+        "name"_ = project.name, "prefix"_ = NamePrefix(FormOf(project, form)),
+        "extension"_ = isNewFormat ? ".vcxproj" : ".vcproj", "guid"_ = GuidText(project.guid),
+        "dependencies"_ = writeDependencies);
 }
 
 // A translated project takes no part in the build of the plain solution.
 void WriteConfigurations(TextWriter& out, const Project& project, Form form) {
   const bool isBuilt = form == Form::Translated || !project.usesQrex;
+  const std::string guid = GuidText(project.guid);
   for (const auto& config : project.configs) {
     const std::string spec = ConfigSpec(*config);
-    const std::string key = GuidText(project.guid) + "." + spec;
-    out << "\t\t" << key << ".ActiveCfg = " << spec << "\n";
-    if (isBuilt) out << "\t\t" << key << ".Build.0 = " << spec << "\n";
+    Write(out, "\t\t$guid$.$spec$.ActiveCfg = $spec$\n", "guid"_ = guid, "spec"_ = spec);
+    if (isBuilt) Write(out, "\t\t$guid$.$spec$.Build.0 = $spec$\n", "guid"_ = guid, "spec"_ = spec);
   }
 }
 
@@ -53,19 +60,24 @@ void WriteSolution(TextWriter& out, const Workspace& workspace, Form form) {
     if (IsListed(*project)) WriteProject(out, *project, form);
     for (const auto& config : project->configs) specs.insert(ConfigSpec(*config));
   }
-  out << "Global\n"
-      << "\tGlobalSection(SolutionConfigurationPlatforms) = preSolution\n";
-  for (const std::string& spec : specs) out << "\t\t" << spec << " = " << spec << "\n";
-  out << "\tEndGlobalSection\n"
-      << "\tGlobalSection(ProjectConfigurationPlatforms) = postSolution\n";
-  for (const auto& project : workspace.projects) {
+  auto writeSpec = [&](const std::string& spec) { Write(out, "\t\t$spec$ = $spec$\n", "spec"_ = spec); };
+  auto writeConfigurations = [&](const auto& project) {
     if (IsListed(*project)) WriteConfigurations(out, *project, form);
-  }
-  out << "\tEndGlobalSection\n"
-      << "\tGlobalSection(SolutionProperties) = preSolution\n"
-      << "\t\tHideSolutionNode = FALSE\n"
-      << "\tEndGlobalSection\n"
-      << "EndGlobal\n";
+  };
+  Write(out,
+        "Global\n"
+        "\tGlobalSection(SolutionConfigurationPlatforms) = preSolution\n"
+        "$platforms$"
+        "\tEndGlobalSection\n"
+        "\tGlobalSection(ProjectConfigurationPlatforms) = postSolution\n"
+        "$configurations$"
+        "\tEndGlobalSection\n"
+        "\tGlobalSection(SolutionProperties) = preSolution\n"
+        "\t\tHideSolutionNode = FALSE\n"
+        "\tEndGlobalSection\n"
+        "EndGlobal\n",
+        "platforms"_ = Each(out, specs, "", writeSpec),
+        "configurations"_ = Each(out, workspace.projects, "", writeConfigurations));
 }
 
 }  // namespace qrex

@@ -3,6 +3,7 @@
 #include "build/tools.h"
 #include "generators/common.h"
 #include "text/paths.h"
+#include "translator/emit/write.h"
 
 namespace qrex {
 
@@ -17,11 +18,12 @@ class ProjectWriter {
  public:
   ProjectWriter(TextWriter& out, const Project& project, Form form)
       : m_out(out), m_project(project), m_name(project.name), m_form(form) {}
-  void Write();
+  void WriteAll();
 
  private:
   void WriteHeader();
   void WriteConfig(const ProjectConfig& config);
+  void WriteLinker(const ProjectConfig& config);
   void WriteTarget();
   void WriteFolder(const ProjectFolder& folder, const std::string& prefix);
   void WriteFile(const ProjectFile& file, const std::string& prefix);
@@ -35,87 +37,110 @@ class ProjectWriter {
   const Form m_form;
 };
 
-void ProjectWriter::Write() {
+void ProjectWriter::WriteAll() {
+  auto writeConfigs = [this] {
+    for (const auto& config : m_project.configs) {
+      m_out << "\n";
+      WriteBranch(config == m_project.configs.front(), *config);
+      m_out << "\n";
+      WriteConfig(*config);
+    }
+  };
   WriteHeader();
-  m_out << "# Begin Project\n"
-           "# PROP AllowPerConfigDependencies 0\n"
-           "# PROP Scc_ProjName \"\"\n"
-           "# PROP Scc_LocalPath \"\"\n"
-           "CPP=cl.exe\n"
-           "MTL=midl.exe\n"
-           "RSC=rc.exe\n";
-  for (const auto& config : m_project.configs) {
-    m_out << "\n";
-    WriteBranch(config == m_project.configs.front(), *config);
-    m_out << "\n";
-    WriteConfig(*config);
-  }
-  m_out << "\n!ENDIF\n";
-  WriteTarget();
-  m_out << "# End Project\n";
+  Write(
+      m_out, R"(
+    # Begin Project
+    # PROP AllowPerConfigDependencies 0
+    # PROP Scc_ProjName ""
+    # PROP Scc_LocalPath ""
+    CPP=cl.exe
+    MTL=midl.exe
+    RSC=rc.exe
+    $configs$
+
+    !ENDIF
+    $target$
+    # End Project
+  )",
+      "configs"_ = writeConfigs, "target"_ = [this] { WriteTarget(); });
 }
 
 // The configurations Release and Debug stand here whatever the project has.
 void ProjectWriter::WriteHeader() {
-  const std::string_view type = TargetTypeName(m_project.targetType);
-  m_out << "# Microsoft Developer Studio Project File - Name=\"" << m_name << "\" - Package Owner=<4>\n"
-        << "# Microsoft Developer Studio Generated Build File, Format Version 6.00\n"
-        << "# ** DO NOT EDIT **\n"
-        << "\n"
-        << "# TARGTYPE \"Win32 (x86) " << type << "\" " << TargetId(m_project.targetType) << "\n"
-        << "\n"
-        << "CFG=" << m_name << " - Win32 Debug\n"
-        << "!MESSAGE This is not a valid makefile. To build this project using NMAKE,\n"
-        << "!MESSAGE use the Export Makefile command and run\n"
-        << "!MESSAGE \n"
-        << "!MESSAGE NMAKE /f \"" << m_name << ".mak\".\n"
-        << "!MESSAGE \n"
-        << "!MESSAGE You can specify a configuration when running NMAKE\n"
-        << "!MESSAGE by defining the macro CFG on the command line. For example:\n"
-        << "!MESSAGE \n"
-        << "!MESSAGE NMAKE /f \"" << m_name << ".mak\" CFG=\"" << m_name << " - Win32 Debug\"\n"
-        << "!MESSAGE \n"
-        << "!MESSAGE Possible choices for configuration are:\n"
-        << "!MESSAGE \n"
-        << "!MESSAGE \"" << m_name << " - Win32 Release\" (based on \"Win32 (x86) " << type << "\")\n"
-        << "!MESSAGE \"" << m_name << " - Win32 Debug\" (based on \"Win32 (x86) " << type << "\")\n"
-        << "!MESSAGE \n"
-        << "\n";
+  Write(m_out, R"(
+    # Microsoft Developer Studio Project File - Name="$name$" - Package Owner=<4>
+    # Microsoft Developer Studio Generated Build File, Format Version 6.00
+    # ** DO NOT EDIT **
+
+    # TARGTYPE "Win32 (x86) $type$" $id$
+
+    CFG=$name$ - Win32 Debug
+    !MESSAGE This is not a valid makefile. To build this project using NMAKE,
+    !MESSAGE use the Export Makefile command and run
+    !MESSAGE $nothing$
+    !MESSAGE NMAKE /f "$name$.mak".
+    !MESSAGE $nothing$
+    !MESSAGE You can specify a configuration when running NMAKE
+    !MESSAGE by defining the macro CFG on the command line. For example:
+    !MESSAGE $nothing$
+    !MESSAGE NMAKE /f "$name$.mak" CFG="$name$ - Win32 Debug"
+    !MESSAGE $nothing$
+    !MESSAGE Possible choices for configuration are:
+    !MESSAGE $nothing$
+    !MESSAGE "$name$ - Win32 Release" (based on "Win32 (x86) $type$")
+    !MESSAGE "$name$ - Win32 Debug" (based on "Win32 (x86) $type$")
+    !MESSAGE $nothing$
+
+  )",
+        "name"_ = m_name, "type"_ = TargetTypeName(m_project.targetType), "id"_ = TargetId(m_project.targetType),
+        "nothing"_ = "");
 }
 
 void ProjectWriter::WriteConfig(const ProjectConfig& config) {
   const bool isDebug = config.name.find("Debug") != std::string::npos;
-  const std::string_view define = isDebug ? "_DEBUG" : "NDEGUG";  // (sic)
-  m_out << "# PROP BASE Use_MFC 0\n"
-        << "# PROP BASE Use_Debug_Libraries " << int{isDebug} << "\n"
-        << "# PROP BASE Output_Dir \"" << config.name << "\"\n"
-        << "# PROP BASE Intermediate_Dir \"" << config.name << "\"\n"
-        << "# PROP BASE Target_Dir \"\"\n"
-        << "# PROP Use_MFC 0\n"
-        << "# PROP Use_Debug_Libraries " << int{isDebug} << "\n"
-        << "# PROP Output_Dir \"" << config.name << "/" << m_name << "\"\n"
-        << "# PROP Intermediate_Dir \"" << config.name << "/" << m_name << "\"\n"
-        << "# PROP Ignore_Export_Lib 0\n"
-        << "# PROP Target_Dir \"\"\n"
-        << "# ADD CPP " << config.compilerText;
-  for (const std::string& path : IncludePaths(m_project, config, IsTranslatedForm(m_project, m_form))) {
-    m_out << " /I \"" << path << "\"";
-  }
-  m_out << "\n"
-        << "# ADD BASE MTL /nologo /D \"" << define << "\" /mktyplib203 /win32\n"
-        << "# ADD MTL /nologo /D \"" << define << "\" /mktyplib203 /win32\n"
-        << "# ADD BASE RSC /l 0x409 /d \"" << define << "\"\n"
-        << "# ADD RSC /l 0x409 /d \"" << define << "\"\n"
-        << "BSC32=bscmake.exe\n"
-        << "# ADD BASE BSC32 /nologo\n"
-        << "# ADD BSC32 /nologo\n";
+  const auto includes = IncludePaths(m_project, config, IsTranslatedForm(m_project, m_form));
+  auto writeInclude = [this](const std::string& path) { m_out << " /I \"" << path << "\""; };
+  Write(
+      m_out, R"(
+    # PROP BASE Use_MFC 0
+    # PROP BASE Use_Debug_Libraries $debug$
+    # PROP BASE Output_Dir "$config$"
+    # PROP BASE Intermediate_Dir "$config$"
+    # PROP BASE Target_Dir ""
+    # PROP Use_MFC 0
+    # PROP Use_Debug_Libraries $debug$
+    # PROP Output_Dir "$config$/$name$"
+    # PROP Intermediate_Dir "$config$/$name$"
+    # PROP Ignore_Export_Lib 0
+    # PROP Target_Dir ""
+    # ADD CPP $compiler$$includes$
+    # ADD BASE MTL /nologo /D "$define$" /mktyplib203 /win32
+    # ADD MTL /nologo /D "$define$" /mktyplib203 /win32
+    # ADD BASE RSC /l 0x409 /d "$define$"
+    # ADD RSC /l 0x409 /d "$define$"
+    BSC32=bscmake.exe
+    # ADD BASE BSC32 /nologo
+    # ADD BSC32 /nologo
+    $linker$
+  )",
+      "debug"_ = int{isDebug}, "config"_ = config.name, "name"_ = m_name, "compiler"_ = config.compilerText,
+      "includes"_ = Each(m_out, includes, "", writeInclude), "define"_ = isDebug ? "_DEBUG" : "NDEGUG",  // (sic)
+      "linker"_ = [&] { WriteLinker(config); });
+}
+
+void ProjectWriter::WriteLinker(const ProjectConfig& config) {
   if (m_project.targetType == TargetType::StaticLibrary) {
-    m_out << "LIB32=link.exe -lib\n"
-          << "# ADD BASE LIB32 /nologo\n"
-          << "# ADD LIB32 /nologo\n";
+    Write(m_out, R"(
+      LIB32=link.exe -lib
+      # ADD BASE LIB32 /nologo
+      # ADD LIB32 /nologo
+    )");
   } else if (m_project.targetType != TargetType::UtilityProject) {
-    m_out << "LINK32=link.exe\n"
-          << "# ADD LINK32 " << config.linkerText << "\n";
+    Write(m_out, R"(
+      LINK32=link.exe
+      # ADD LINK32 $linker$
+    )",
+          "linker"_ = config.linkerText);
   }
 }
 
@@ -126,9 +151,12 @@ void ProjectWriter::WriteTarget() {
   const std::string prefix = PathJoin(base, m_project.rootToProjDir) + "/";
   WriteFolder(m_project.rootFolder, prefix);
   if (m_form == Form::Plain) {
-    m_out << "# Begin Source File\n"
-          << "SOURCE=" << prefix << m_name << ".qrpj\n"
-          << "# End Source File\n";
+    Write(m_out, R"(
+      # Begin Source File
+      SOURCE=$prefix$$name$.qrpj
+      # End Source File
+    )",
+          "prefix"_ = prefix, "name"_ = m_name);
   }
   m_out << "# End Target\n";
 }
@@ -136,26 +164,35 @@ void ProjectWriter::WriteTarget() {
 // Paths are those of the folder tree and the display names.
 void ProjectWriter::WriteFolder(const ProjectFolder& folder, const std::string& prefix) {
   for (const auto& subfolder : folder.subfolders) {
-    m_out << "# Begin Group \"" << subfolder->name << "\"\n"
-          << "# PROP Default_Filter \"\"\n";
-    WriteFolder(*subfolder, prefix + subfolder->name + "/");
-    m_out << "# End Group\n";
+    Write(
+        m_out, R"(
+      # Begin Group "$name$"
+      # PROP Default_Filter ""
+      $content$
+      # End Group
+    )",
+        "name"_ = subfolder->name, "content"_ = [&] { WriteFolder(*subfolder, prefix + subfolder->name + "/"); });
   }
   for (const ProjectFile* file : folder.files) WriteFile(*file, prefix);
 }
 
 void ProjectWriter::WriteFile(const ProjectFile& file, const std::string& prefix) {
-  m_out << "# Begin Source File\n"
-        << "SOURCE=" << prefix << file.name << "\n";
-  if (file.kind != FileKind::Qrpj) {
+  auto writeChanges = [&] {
+    if (file.kind == FileKind::Qrpj) return;
     WriteFileChanges(file.excluded, "", "");
     for (const auto& record : file.configRecords) {
       WriteBranch(record == file.configRecords.front(), *record->config);
       WriteFileChanges(record->excluded, record->addText, record->removeText);
     }
     if (!file.configRecords.empty()) m_out << "!ENDIF\n";
-  }
-  m_out << "# End Source File\n";
+  };
+  Write(m_out, R"(
+    # Begin Source File
+    SOURCE=$prefix$$name$
+    $changes$
+    # End Source File
+  )",
+        "prefix"_ = prefix, "name"_ = file.name, "changes"_ = writeChanges);
 }
 
 void ProjectWriter::WriteFileChanges(bool excluded, std::string_view added, std::string_view removed) {
@@ -170,33 +207,47 @@ void ProjectWriter::WriteBranch(bool isFirst, const ProjectConfig& config) {
 
 }  // namespace
 
-void WriteVc6Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).Write(); }
+void WriteVc6Project(TextWriter& out, Project& project, Form form) { ProjectWriter(out, project, form).WriteAll(); }
+
+namespace {
+
+void WriteDependencies(TextWriter& out, const Project& project) {
+  for (const std::string& path : project.subprojects) {
+    const Project* dependency = FindDependency(project, path);
+    if (!dependency) continue;
+    Write(out, R"(
+      Begin Project Dependency
+      Project_Dep_Name $name$
+      End Project Dependency
+    )",
+          "name"_ = dependency->name);
+  }
+}
+
+}  // namespace
 
 void WriteVc6Workspace(TextWriter& out, const Workspace& workspace, Form form) {
   out << "Microsoft Developer Studio Workspace File, Format Version 6.00\n"
-      << "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\n"
-      << "\n";
+         "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\n\n";
   for (const auto& project : workspace.projects) {
-    const std::string_view prefix = NamePrefix(FormOf(*project, form));
-    out << std::string(79, '#') << "\n"
-        << "\n"
-        << "Project: \"" << project->name << "\"=./" << prefix << project->name << ".dsp - Package Owner=<4>\n"
-        << "\n"
-        << "Package=<5>\n"
-        << "{{{\n"
-        << "}}}\n"
-        << "\n"
-        << "Package=<4>\n"
-        << "{{{\n";
-    for (const std::string& path : project->subprojects) {
-      const Project* dependency = FindDependency(*project, path);
-      if (!dependency) continue;
-      out << "    Begin Project Dependency\n"
-          << "    Project_Dep_Name " << dependency->name << "\n"
-          << "    End Project Dependency\n";
-    }
-    out << "}}}\n"
-        << "\n";
+    Write(
+        out, R"(
+      ###############################################################################
+
+      Project: "$name$"=./$prefix$$name$.dsp - Package Owner=<4>
+
+      Package=<5>
+      {{{
+      }}}
+
+      Package=<4>
+      {{{
+          $dependencies$
+      }}}
+
+    )",
+        "name"_ = project->name, "prefix"_ = NamePrefix(FormOf(*project, form)),
+        "dependencies"_ = [&] { WriteDependencies(out, *project); });
   }
 }
 
