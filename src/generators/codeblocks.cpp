@@ -70,9 +70,12 @@ void WriteSources(XmlWriter& xml, const Project& project) {
       xml.Empty("Add", {{"option", "-I" + path}});
     }
   }
-  const std::string directory = isTranslated ? CompiledDirectory(project, config) : project.rootDir;
+  std::string path = (isTranslated ? CompiledDirectory(project, config) : project.rootDir) + "/";
+  const size_t directorySize = path.size();
   for (const ProjectFile* file : project.files) {
-    if (IsUnit(*file)) xml.Empty("Unit", {{"filename", directory + "/" + file->path}});
+    if (!IsUnit(*file)) continue;
+    path.replace(directorySize, std::string::npos, file->path);
+    xml.Empty("Unit", {{"filename", path}});
   }
 }
 

@@ -100,11 +100,9 @@ void WriteProjectMakeFile(TextWriter& out, const Project& project, const Project
          "-include $(OBJS:.o=.d)\n\n";
   WriteTargetRule(out, project, target);
   for (const ProjectFile* file : files) {
-    writeObject(file);
-    out << ": ";
-    writeSource(file);
-    out << "\n\t" << (file->kind == FileKind::Cpp ? "$(CXX) -c $(CXXFLAGS)" : "$(CC) -c $(CFLAGS)");
-    out << " $(INCLUDE_PATH) -o $@ $<\n\n";
+    out << objects << file->stem << ".o: " << sources << file->path
+        << (file->kind == FileKind::Cpp ? "\n\t$(CXX) -c $(CXXFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n"
+                                        : "\n\t$(CC) -c $(CFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n");
   }
   out << ".PHONY : clean\nclean:\n\trm -f " << target << " $(OBJS:.o=.d) $(OBJS)\n";
 }

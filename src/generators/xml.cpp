@@ -8,25 +8,26 @@ constexpr int64_t kBlanks = 2;
 
 }  // namespace
 
-void XmlWriter::WriteAttribute(const XmlAttribute& attribute) {
+void XmlWriter::AddAttribute(const XmlAttribute& attribute) {
   if (m_layout == XmlLayout::AttributeLines) {
-    m_out << '\n' << m_tabs << '\t';
+    m_line.append("\n").append(m_tabs).append("\t");
   } else {
-    m_out << ' ';
+    m_line += ' ';
   }
-  m_out << attribute.name << "=\"" << attribute.value << '"';
+  m_line.append(attribute.name).append("=\"").append(attribute.value) += '"';
 }
 
-void XmlWriter::WriteTagEnd(Ending ending, bool isLine) {
+void XmlWriter::EndTag(Ending ending, bool isLine) {
   if (isLine) {
-    m_out << '\n' << m_tabs << (ending == Ending::Empty ? "/>" : "\t>");
+    m_line.append("\n").append(m_tabs).append(ending == Ending::Empty ? "/>" : "\t>");
   } else {
-    m_out << (ending == Ending::Empty ? " />" : ">");
+    m_line.append(ending == Ending::Empty ? " />" : ">");
   }
 }
 
 void XmlWriter::BeginBody() {
-  m_out << '\n';
+  m_line += '\n';
+  WriteLine();
   if (m_layout != XmlLayout::Blanks) {
     m_tabs += '\t';
     return;
@@ -42,7 +43,13 @@ void XmlWriter::EndBody(std::string_view name) {
     m_out.Flush();
     m_out.AddIndent(-kBlanks);
   }
-  m_out << m_tabs << "</" << name << ">\n";
+  m_line.append(m_tabs).append("</").append(name).append(">\n");
+  WriteLine();
+}
+
+void XmlWriter::WriteLine() {
+  m_out << m_line;
+  m_line.clear();
 }
 
 }  // namespace qrex

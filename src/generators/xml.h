@@ -28,15 +28,17 @@ class XmlWriter {
   // <NAME A="B" />
   template <typename Attributes = std::initializer_list<XmlAttribute>>
   void Empty(std::string_view name, const Attributes& attributes = {}) {
-    WriteTag(name, attributes, Ending::Empty);
-    m_out << '\n';
+    AddTag(name, attributes, Ending::Empty);
+    m_line += '\n';
+    WriteLine();
   }
 
   // <NAME A="B">VALUE</NAME>
   template <typename Attributes = std::initializer_list<XmlAttribute>>
   void Value(std::string_view name, std::string_view value, const Attributes& attributes = {}) {
-    WriteTag(name, attributes, Ending::Open);
-    m_out << value << "</" << name << ">\n";
+    AddTag(name, attributes, Ending::Open);
+    m_line.append(value).append("</").append(name).append(">\n");
+    WriteLine();
   }
 
  private:
@@ -44,19 +46,21 @@ class XmlWriter {
   enum class Ending { Open, Empty };
 
   template <typename Attributes>
-  void WriteTag(std::string_view name, const Attributes& attributes, Ending ending) {
-    m_out << m_tabs << '<' << name;
-    for (const XmlAttribute& attribute : attributes) WriteAttribute(attribute);
-    WriteTagEnd(ending, m_layout == XmlLayout::AttributeLines && !std::empty(attributes));
+  void AddTag(std::string_view name, const Attributes& attributes, Ending ending) {
+    m_line.append(m_tabs).append("<").append(name);
+    for (const XmlAttribute& attribute : attributes) AddAttribute(attribute);
+    EndTag(ending, m_layout == XmlLayout::AttributeLines && !std::empty(attributes));
   }
-  void WriteAttribute(const XmlAttribute& attribute);
-  void WriteTagEnd(Ending ending, bool isLine);
+  void AddAttribute(const XmlAttribute& attribute);
+  void EndTag(Ending ending, bool isLine);
   void BeginBody();
   void EndBody(std::string_view name);
+  void WriteLine();
 
   TextWriter& m_out;
   const XmlLayout m_layout;
   std::string m_tabs;  // ahead of each line; blanks are the indentation of the text
+  std::string m_line;  // what is being composed: the text is written to once for each
 };
 
 // What is written until the end of the scope is the body of the element. `name` outlives it.
@@ -64,7 +68,7 @@ class XmlElement {
  public:
   template <typename Attributes = std::initializer_list<XmlAttribute>>
   XmlElement(XmlWriter& xml, std::string_view name, const Attributes& attributes = {}) : m_xml(xml), m_name(name) {
-    m_xml.WriteTag(name, attributes, XmlWriter::Ending::Open);
+    m_xml.AddTag(name, attributes, XmlWriter::Ending::Open);
     m_xml.BeginBody();
   }
   ~XmlElement() { m_xml.EndBody(m_name); }
