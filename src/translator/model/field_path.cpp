@@ -1,6 +1,7 @@
 #include "translator/model/field_path.h"
 
 #include "text/numbers.h"
+#include "translator/emit/emit.h"
 
 namespace qrex {
 
@@ -49,8 +50,6 @@ std::string KeyTypeText(const PathElement& element) {
 
 bool IsOneByteIndex(const PathElement& element) { return element.value >= 0 && element.value <= kOneByteBound; }
 
-std::string Decimal(char byte) { return std::to_string(static_cast<unsigned char>(byte)); }
-
 }  // namespace
 
 size_t FieldPath::ParameterCount() const {
@@ -83,21 +82,24 @@ std::string FieldPath::Arguments(size_t first, size_t last) {
   return text;
 }
 
-std::string FieldPath::Checks() const {
-  std::string text;
+// Each element with the name of its parameter, which a constant has none of.
+template <typename Visit>
+void FieldPath::ForEach(Visit visit) const {
   size_t number = 0;
   for (const PathElement& element : m_elements) {
-    if (element.kind == Kind::Constant) continue;
-    const std::string name = ParameterName(number++);
-    if (element.kind != Kind::Index) continue;
-    text += "vxAssert(0 <= " + name;
-    if (element.value >= 0) text += " && " + name + " < " + std::to_string(element.value);
-    text += "); ";
+    visit(element, element.kind == Kind::Constant ? std::string() : ParameterName(number++));
   }
-  return text;
 }
 
-std::string FieldPath::Body() const {
+void FieldPath::WriteChecks(TextWriter& out) const {
+  ForEach([&](const PathElement& element, const std::string& name) {
+    if (element.kind != Kind::Index) return;
+    Write(out, "vxAssert(0 <= $name$$bound$); ", "name"_ = name,
+          "bound"_ = element.value < 0 ? "" : " && " + name + " < " + std::to_string(element.value));
+  });
+}
+
+void FieldPath::WriteBody(TextWriter& out) const {
   size_t size = 0;
   bool isFixed = true;
   bool isKnown = true;
@@ -115,69 +117,66 @@ std::string FieldPath::Body() const {
       isFixed = false;
     }
   }
-  return Checks() + (!isKnown ? ArchiveBody() : isFixed ? InitBody(size) : ReserveBody(size));
+  WriteChecks(out);
+  if (!isKnown) {
+    WriteArchiveBody(out);
+  } else if (isFixed) {
+    WriteInitBody(out, size);
+  } else {
+    WriteReserveBody(out, size);
+  }
 }
 
-std::string FieldPath::ArchiveBody() const {
-  std::string text = "vesk::FieldPathArchive _ar; ";
-  size_t number = 0;
-  for (const PathElement& element : m_elements) {
-    if (element.kind == Kind::Constant) {
-      text += "vesk::SerialiseVariableLengthUint(_ar," + std::to_string(element.value) + "); ";
-    } else if (element.kind == Kind::Index) {
-      text += "vesk::SerialiseVariableLengthUint(_ar," + ParameterName(number++) + "); ";
+void FieldPath::WriteArchiveBody(TextWriter& out) const {
+  out << "vesk::FieldPathArchive _ar; ";
+  ForEach([&](const PathElement& element, const std::string& name) {
+    if (element.kind == Kind::Key) {
+      Write(out, "_ar << $name$; ", "name"_ = name);
     } else {
-      text += "_ar << " + ParameterName(number++) + "; ";
+      Write(out, "vesk::SerialiseVariableLengthUint(_ar,$value$); ",
+            "value"_ = element.kind == Kind::Constant ? std::to_string(element.value) : name);
     }
-  }
-  return text + "_ar.InitPath(_path); ";
+  });
+  out << "_ar.InitPath(_path); ";
 }
 
 // `size` is an upper bound.
-std::string FieldPath::ReserveBody(size_t size) const {
+void FieldPath::WriteReserveBody(TextWriter& out, size_t size) const {
   const bool isLocal = size <= kLocalSize;
-  std::string text = "vesk::octet_t* p=_path.";
-  text += isLocal ? "BeginReserveLocal(" : "BeginReserveHeap(" + std::to_string(size);
-  text += "); ";
-  size_t number = 0;
-  for (const PathElement& element : m_elements) {
+  Write(out, "vesk::octet_t* p=_path.BeginReserve$place$($size$); ", "place"_ = isLocal ? "Local" : "Heap",
+        "size"_ = isLocal ? "" : std::to_string(size));
+  ForEach([&](const PathElement& element, const std::string& name) {
     if (element.kind == Kind::Constant) {
-      for (char byte : ConstantBytes(element)) text += "*p++ =" + Decimal(byte) + "; ";
-      continue;
-    }
-    const std::string name = ParameterName(number++);
-    if (element.kind == Kind::Key) {
-      text +=
-          "*(" + std::string(KeyShortName(element)) + "*)p=" + name + "; p+=" + std::to_string(KeySize(element)) + "; ";
+      for (unsigned char byte : ConstantBytes(element)) Write(out, "*p++ =$byte$; ", "byte"_ = byte);
+    } else if (element.kind == Kind::Key) {
+      Write(out, "*($type$*)p=$name$; p+=$size$; ", "type"_ = KeyShortName(element), "name"_ = name,
+            "size"_ = KeySize(element));
     } else if (IsOneByteIndex(element)) {
-      text += "*p++ =(vesk::octet_t)" + name + "; ";
+      Write(out, "*p++ =(vesk::octet_t)$name$; ", "name"_ = name);
     } else {
-      text += "p=vesk::SerialiseVariableLengthInteger(p," + name + "); ";
+      Write(out, "p=vesk::SerialiseVariableLengthInteger(p,$name$); ", "name"_ = name);
     }
-  }
-  return text + "_path." + (isLocal ? "EndReserveLocal" : "EndReserveHeap") + "(p); ";
+  });
+  Write(out, "_path.EndReserve$place$(p); ", "place"_ = isLocal ? "Local" : "Heap");
 }
 
-std::string FieldPath::InitBody(size_t size) const {
-  std::string text = "vesk::octet_t* p=_path.";
-  text += size <= kLocalSize ? "InitLocalBuffer(" : "InitHeapBuffer(";
-  text += std::to_string(size) + "); ";
+void FieldPath::WriteInitBody(TextWriter& out, size_t size) const {
+  Write(out, "vesk::octet_t* p=_path.Init$place$Buffer($size$); ", "place"_ = size <= kLocalSize ? "Local" : "Heap",
+        "size"_ = size);
   size_t position = 0;
-  size_t number = 0;
-  for (const PathElement& element : m_elements) {
+  ForEach([&](const PathElement& element, const std::string& name) {
     if (element.kind == Kind::Constant) {
-      for (char byte : ConstantBytes(element)) text += "p[" + std::to_string(position++) + "]=" + Decimal(byte) + "; ";
-      continue;
-    }
-    const std::string name = ParameterName(number++);
-    if (element.kind == Kind::Index) {
-      text += "p[" + std::to_string(position++) + "]=(vesk::octet_t)" + name + "; ";
+      for (unsigned char byte : ConstantBytes(element)) {
+        Write(out, "p[$position$]=$byte$; ", "position"_ = position++, "byte"_ = byte);
+      }
+    } else if (element.kind == Kind::Index) {
+      Write(out, "p[$position$]=(vesk::octet_t)$name$; ", "position"_ = position++, "name"_ = name);
     } else {
-      text += "*(" + KeyTypeText(element) + "*)(p+" + std::to_string(position) + ")=" + name + "; ";
+      Write(out, "*($type$*)(p+$position$)=$name$; ", "type"_ = KeyTypeText(element), "position"_ = position,
+            "name"_ = name);
       position += KeySize(element);
     }
-  }
-  return text;
+  });
 }
 
 }  // namespace qrex

@@ -36,13 +36,15 @@ class FieldPath {
   std::string Arguments() const { return Arguments(0, ParameterCount()); }
 
   // The statements that fill `_path`, each followed by a blank.
-  std::string Body() const;
+  void WriteBody(TextWriter& out) const;
 
  private:
-  std::string Checks() const;
-  std::string ArchiveBody() const;
-  std::string ReserveBody(size_t size) const;
-  std::string InitBody(size_t size) const;
+  template <typename Visit>
+  void ForEach(Visit visit) const;
+  void WriteChecks(TextWriter& out) const;
+  void WriteArchiveBody(TextWriter& out) const;
+  void WriteReserveBody(TextWriter& out, size_t size) const;
+  void WriteInitBody(TextWriter& out, size_t size) const;
   std::vector<PathElement> m_elements;
 };
 

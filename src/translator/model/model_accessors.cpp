@@ -85,12 +85,14 @@ void AccessorWriter::WriteOperation(std::string_view function, const std::string
 
 void AccessorWriter::WritePathFunctions(const std::string& name) {
   const std::string parameters = m_path.Parameters();
-  Write(m_out, R"(
+  Write(
+      m_out, R"(
     static void Get$name$Path(vesk::Path& _path$further$) { $body$}
     static vesk::Path Get$name$Path($parameters$) { vesk::Path _path; Get$name$Path($pathAndArguments$); return _path; }
   )",
-        "name"_ = name, "further"_ = parameters.empty() ? "" : "," + parameters, "body"_ = m_path.Body(),
-        "parameters"_ = parameters, "pathAndArguments"_ = parameters.empty() ? "_path" : "_path," + m_path.Arguments());
+      "name"_ = name, "further"_ = parameters.empty() ? "" : "," + parameters,
+      "body"_ = [&] { m_path.WriteBody(m_out); }, "parameters"_ = parameters,
+      "pathAndArguments"_ = parameters.empty() ? "_path" : "_path," + m_path.Arguments());
 }
 
 void AccessorWriter::WriteField(PathElement element, TypeView type, const std::string& name,
