@@ -132,7 +132,7 @@ class ProjectWriter {
  public:
   ProjectWriter(TextWriter& out, Project& project, Form form)
       : m_xml(out, XmlLayout::Blanks), m_project(project), m_form(form) {}
-  void Write();
+  void WriteAll();
 
  private:
   void WriteConfigurations();
@@ -164,7 +164,7 @@ class ProjectWriter {
   const Form m_form;
 };
 
-void ProjectWriter::Write() {
+void ProjectWriter::WriteAll() {
   for (const auto& config : m_project.configs) config->linkerOptions = LinkerOptions(m_project, *config);
   const XmlElement project(m_xml, "Project",
                            {{"DefaultTargets", "Build"},
@@ -429,7 +429,7 @@ void ProjectWriter::WriteIncludes(const ProjectConfig& config, std::string_view 
 
 void WriteVc10Project(TextWriter& out, Project& project, Form form) {
   out << kHead;
-  ProjectWriter(out, project, form).Write();
+  ProjectWriter(out, project, form).WriteAll();
 }
 
 void WriteVc10Filters(TextWriter& out, Project& project, Form form) {

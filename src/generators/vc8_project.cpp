@@ -32,7 +32,7 @@ class ProjectWriter {
         m_form(form),
         m_filesBase(IsTranslatedForm(project, form) ? "qrexsource/$(PlatformName)/$(ConfigurationName)"
                                                     : project.rootDir) {}
-  void Write();
+  void WriteAll();
 
  private:
   void WritePlatforms();
@@ -58,7 +58,7 @@ void AddAttributes(std::vector<XmlAttribute>& attributes, const OptionMap& optio
   for (const auto& [property, value] : options) attributes.push_back({property, value});
 }
 
-void ProjectWriter::Write() {
+void ProjectWriter::WriteAll() {
   m_project.CollectFiles();
   const XmlElement project(m_xml, "VisualStudioProject",
                            {{"ProjectType", "Visual C++"},
@@ -203,7 +203,7 @@ void ProjectWriter::WriteAssemblerTool(const ProjectConfig& config) {
 
 void WriteVc8Project(TextWriter& out, Project& project, Form form) {
   out << "<?xml version=\"1.0\" encoding=\"Windows-1252\"?>\n";
-  ProjectWriter(out, project, form).Write();
+  ProjectWriter(out, project, form).WriteAll();
 }
 
 }  // namespace qrex

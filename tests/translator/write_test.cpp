@@ -77,7 +77,7 @@ TEST(WriteTest, FurtherLinesWithinALine) {
           f($first$) { g($second$); }
       }
     )",
-          "first"_ = twoLines, "second"_ = "h(),\nk()");
+          "first"_ = twoLines, "second"_ = "h(),\nk()\n");
     const Block block(out);
     out << "int a;\n";
   });
@@ -85,7 +85,8 @@ TEST(WriteTest, FurtherLinesWithinALine) {
             "{\n"
             "    f(map<int,\n"
             "    int>) { g(h(),\n"
-            "    k()); }\n"
+            "    k()\n"
+            "    ); }\n"
             "}\n"
             "{\n"
             "    int a;\n"

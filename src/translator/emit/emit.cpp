@@ -51,9 +51,10 @@ std::string ExportPrefix(const NameSpaceElement& element) {
 std::string TargetIdentifier(const NameSpaceElement& element) { return element.owner.file.project->MangledProjDir(); }
 
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments) {
-  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) {
+  auto writeArgument = [&](const FunctionArg& argument) {
     PrintDeclaration(out, argument.type, argument.name, DeclarationMode::Plain);
-  });
+  };
+  Each(out, arguments, ",", writeArgument)();
 }
 
 void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, const FunctionSignature& method) {
@@ -63,7 +64,7 @@ void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, co
 }
 
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments) {
-  WriteJoined(out, arguments, ",", [&](const FunctionArg& argument) { out << argument.name; });
+  Each(out, arguments, ",", [&](const FunctionArg& argument) { out << argument.name; })();
 }
 
 void WriteReturn(TextWriter& out, const TypeCode& returnType) {
@@ -85,13 +86,6 @@ std::string NameOrZero(bool present, const std::string& name) { return present ?
 
 std::string CountedName(size_t count, const std::string& name) {
   return count == 0 ? "0,0" : name + "," + std::to_string(count);
-}
-
-void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments) {
-  for (size_t dollar; (dollar = text.find('$')) != std::string_view::npos; text.remove_prefix(dollar + 2)) {
-    out << text.substr(0, dollar) << arguments.begin()[text[dollar + 1] - '0'];
-  }
-  out << text;
 }
 
 }  // namespace qrex

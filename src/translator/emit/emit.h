@@ -46,17 +46,6 @@ std::string TargetIdentifier(const NameSpaceElement& element);  // X: the projec
 inline std::string_view BoolText(bool value) { return value ? "true" : "false"; }
 inline char BitText(bool value) { return value ? '1' : '0'; }
 
-// Each item by `writeOne`, with the separator between them.
-template <typename Items, typename WriteOne>
-void WriteJoined(TextWriter& out, const Items& items, std::string_view separator, WriteOne writeOne) {
-  bool first = true;
-  for (const auto& item : items) {
-    if (!first) out << separator;
-    first = false;
-    writeOne(item);
-  }
-}
-
 // Argument lists, all without their parentheses.
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "T a,U b"
 // "N const* _self,T a,U b": the arguments of a function that stands for a method of N.
@@ -71,8 +60,5 @@ inline void WriteValue(TextWriter& out, const FunctionSignature& signature) { Wr
 // Pieces of records: "NAME" or "0"; "NAME,count" or "0,0".
 std::string NameOrZero(bool present, const std::string& name);
 std::string CountedName(size_t count, const std::string& name);
-
-// Fixed multi-line text: each `$0`..`$9` of the text is replaced by the argument of that index.
-void WriteText(TextWriter& out, std::string_view text, std::initializer_list<std::string_view> arguments);
 
 }  // namespace qrex
