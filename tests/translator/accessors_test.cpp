@@ -212,10 +212,6 @@ TEST_F(AccessorsTest, OperatorsOfAttributes) {
   }
 }
 
-TEST_F(AccessorsTest, ProxiesOfTwoDimensions) {
-  EXPECT_EQ(AttributeStruct("int32 x[2][3]"), Spelt(Golden("accessors_proxies_of_two_dimensions")));
-}
-
 // Forwarders hand on what each sort of element offers, with the proxy's own key in front.
 TEST_F(AccessorsTest, ForwardersOfAKeyProxy) {
   const struct {

@@ -15,66 +15,6 @@ class ClassesTest : public TranslateTest {
   }
 };
 
-TEST_F(ClassesTest, WholeHeaderAndTail) {
-  MakeWorld(TargetType::DynamicLinkLibrary);
-  AssertGenerated(
-      R"($class Late;
-$class+ Later isa vesk::IObject;
-namespace geo
-{
-$struct Point { int x; $int32 y; };
-$class+ Shape isa vesk::IObject : Base,private other::Base<int> : [ 7, "meta" ]
-{
-public:
-    Shape() : m_count(0) { }
-    $string8 name : [ colour(1) ];
-    $xvector<const Point*> points[2];
-    $Point const* at(int32 i, Late& late) const { return 0; }
-    $void clear();
-private:
-    int m_count;
-};
-$class Pair<typename T, int N> <<reflect>> { public: T items[N]; };
-}
-)",
-      R"(class Late;
-
-class app_API Later;
-app_API vesk::ReflectedClass const& _GetReflected(Later const*);
-app_API vesk::TypeOps const& _GetTypeOps(Later const*);
-
-namespace geo
-{
-struct Point;
-
-} //geo
-)" + TraitsText("geo::Point", "struct", "000000000000000000") +
-          R"(} // namespace vesk
-namespace geo
-{
-struct Point
-{ int x; vesk::int32 y; 
-public:
-    vesk::int32 Gety() const { return y; }
-    void Sety(vesk::int32 _v) { y = _v; }
-    
-};
-
-
-class Shape;
-
-} //geo
-)" + TraitsText("geo::Shape", "class", "111111100000010000") +
-          Golden("classes_whole_header"),
-      Golden("classes_whole_tail"));
-  EXPECT_EQ(
-      "t.h(3) : warning W1008 : $class+ Later doesn't appear in public header of library\n"
-      "t.h(7) : warning W1008 : $class+ geo::Shape doesn't appear in public header of library\n"
-      "t.h(7) : warning W1002 : Reflected $class+ geo::Shape references non-registered $struct geo::Point\n"
-      "t.h(6) : see declaration of $struct geo::Point\n",
-      Messages());
-}
-
 // The heads of definitions: what stands between `struct` and the body.
 TEST_F(ClassesTest, Heads) {
   const std::pair<std::string, std::string> cases[] = {
@@ -122,62 +62,6 @@ TEST_F(ClassesTest, ForwardAndDeferred) {
   EXPECT_EQ(header.find("_GetTypeOps(A const*);"), header.rfind("_GetTypeOps(A const*);"));
 }
 
-TEST_F(ClassesTest, Bodies) {
-  const std::pair<std::string, std::string> cases[] = {
-      {"$$() { $$ * p; if (x) { } }", "A() { A * p; if (x) { } }\n"},
-      {"void f() { g($this, $this); h($new B(1)); }",
-       "void f() { g(this->GetThisAsFinalClass(), this->GetThisAsFinalClass()); h(vesk::DollarNew(new B(1))); }\n"},
-      {"$std::map<int,int> m; /* $ } */", "std::map<int,int> m; /* $ } */\n"},
-      {"$int f(int a) const { return \"}\"[a]; } $void g();", "int f(int a) const { return \"}\"[a]; } void g();\n"},
-  };
-  for (const auto& [body, expected] : cases) {
-    const std::string text = ClassText("$struct A\n{" + body + "};");
-    const std::string head = "struct A\n{";
-    EXPECT_EQ(head + expected, text.substr(0, head.size() + expected.size())) << body;
-  }
-}
-
-TEST_F(ClassesTest, NestedClasses) {
-  const std::string header = ClassText(
-      "$struct A\n{\n    $class B;\n    $struct C <<os>>\n    {\n        $int32 x;\n        $class D { };\n    "
-      "};\n};\n");
-  EXPECT_EQ(
-      "struct A\n{\n    class B;\n\n    struct C\n{\n        vesk::int32 x;\n        class D\n{ \npublic:\n    "
-      "\n};\n\n\n"
-      "    \npublic:\n    vesk::int32 Getx() const { return x; }\n    void Setx(vesk::int32 _v) { x = _v; }\n    "
-      "\n};\n\n\n"
-      "inline vesk::xostream& operator<<(vesk::xostream& _os,C const& _x) { ((C&)_x).Write(_os); return _os; }\n\n"
-      "\npublic:\n    \n};\n\n\n",
-      header);
-}
-
-// The body of an external class is dropped; only its reflection data is written.
-TEST_F(ClassesTest, ExternalClass) {
-  const Generated generated =
-      TranslateHeader("$struct+ A <<extern -traits>>\n{\n    int y;\n    $int32 x; $void f(); };\n");
-  EXPECT_EQ(
-      "\nvesk::ReflectedClass const& _GetReflected(A const*);\nvesk::TypeOps const& _GetTypeOps(A const*);\n"
-      "\ninline void __stdcall f(A* _self) { _self->f(); }\n",
-      generated.header);
-  EXPECT_NE(std::string::npos, generated.tail.find("{ \"x\", offsetof(A,x), A_x },\n"));
-  EXPECT_NE(std::string::npos, generated.tail.find("    void _Register_A()\n"));
-}
-
-TEST_F(ClassesTest, Operators) {
-  const Generated generated = TranslateHeader("$struct A<class T> <<os ar>> { $T* f(T t, xmap<T,T> m); };");
-  EXPECT_NE(std::string::npos,
-            generated.header.find(
-                "};\n\n"
-                "template <class T> \ntemplate<typename Archive> inline void Serialise(Archive& _ar,A<T> const& _x) "
-                "{ _x.Serialise(_ar); }\n"
-                "template <class T> \ntemplate<typename Archive> inline void Deserialise(Archive& _ar,A<T>& _x) "
-                "{ _x.Deserialise(_ar); }\n"
-                "\ntemplate <class T> inline vesk::xostream& operator<<(vesk::xostream& _os,A<T> const& _x) "
-                "{ ((A<T>&)_x).Write(_os); return _os; }\n"
-                "\ninline T* __stdcall f(A* _self,T t,vesk::xmap<T,T > m) { return _self->f(t,m); }"))
-      << generated.header;
-}
-
 // The flags of the record, and its operations.
 TEST_F(ClassesTest, RecordsOfQualifiers) {
   const std::string none = "0, 0, 0, 0, 0, 0 ";
@@ -201,24 +85,6 @@ TEST_F(ClassesTest, RecordsOfQualifiers) {
     EXPECT_EQ("            " + flags, record.substr(0, record.find(','))) << text;
     EXPECT_EQ(operations, Section(record, "{ sizeof(A), ", "}")) << text;
   }
-}
-
-TEST_F(ClassesTest, InterfacesOfRecords) {
-  const Generated generated = TranslateHeader(
-      "$interface+ I : vesk::IPersistable { }; $interface J : vesk::IObject { };\n"
-      "$warning(disable: 1013) $struct A isa J, I { };");
-  EXPECT_NE(
-      std::string::npos,
-      generated.header.find(
-          "template<> struct directly_implements_interface<A,J> { static const bool value = true; };\n"
-          "template<> struct directly_implements_interface<A,I> { static const bool value = true; };\n"
-          "template<> struct indirectly_implements_interface<A,vesk::IObject> { static const bool value = true; };\n"
-          "template<> struct indirectly_implements_interface<A,vesk::IPersistable> "
-          "{ static const bool value = true; };\n"))
-      << generated.header;
-  EXPECT_NE(std::string::npos, generated.tail.find("return static_cast<vesk::ptr<J> >(new A());\n"));
-  EXPECT_NE(std::string::npos, generated.tail.find("A_interfaces,3,2,\n")) << generated.tail;
-  EXPECT_EQ(std::string::npos, generated.tail.find("GetReflectedInterface<J")) << "not reflected";
 }
 
 TEST_F(ClassesTest, Errors) {

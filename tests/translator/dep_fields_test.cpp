@@ -7,64 +7,6 @@ namespace {
 
 using DepFieldsTest = TranslateTest;
 
-TEST_F(DepFieldsTest, DepWithAllSections) {
-  EXPECT_EQ(Golden("dep_fields_dep_with_all_sections"),
-            Body("$dep string8 a calc { a = name(); } create { make(a); } destroy { }\n"
-                 "visit { _v << $$::shared; } evictable { return $this->free(); }\n"
-                 "evict { $new X(1); $other; } invalidate\n{\n    stale();\n}\n;\n"));
-}
-
-TEST_F(DepFieldsTest, DepWithoutSections) {
-  const std::string text = Body("$dep int32 a = b + 1;\n");
-  EXPECT_EQ("(vesk::int32& a) const\n{\n    a = b + 1\n}\n", Section(text, "void a_calc", "mutable"));
-  EXPECT_EQ("vesk::DGDepNode(vesk::DF_SYNC_DEP) {}\n", Section(text, "Depnode_a() : ", "    virtual"));
-  EXPECT_EQ(R"(    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        return vesk::CacheValueIsEvictable(_self->_a_);
-    }
-    virtual void OnEvict() const
-    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        vesk::OnEvictCacheValue(_self->_a_); vesk::ClearCacheValue(_self->_a_);
-    }
-    value_type read() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
-    operator value_type() const { return CONST_ATTRIB_CAST(S,a)->Geta(); }
-} a;
-vesk::int32 Geta() const { a.ReadBarrier(); return _a_; }
-)",
-            Section(text, "virtual bool IsEvictable() const\n", "\n\n") + "\n");
-  EXPECT_EQ(R"(    {
-        S const* _self = CONST_ATTRIB_CAST(S,a);
-        _self->a_calc(_self->_a_);
-        if (vesk::TypeHasAdditionalSize<value_type>()) UpdateByteSize();
-        return true;
-    }
-)",
-            Section(Body("$dep ^ int32 a = 1;\n"), "RecalcCache() const\n", "    virtual"));
-}
-
-TEST_F(DepFieldsTest, VoidDep) {
-  const std::string text = Body("$dep void d = { go();\ndone(); };\n");
-  EXPECT_EQ("() const\n{\n    go();\n    done();\n}\n", Section(text, "void d_calc", "struct Depnode_d"));
-  EXPECT_EQ("    {\n        return 0;\n    }\n", Section(text, "ByteSize() const\n", "    virtual"));
-  EXPECT_EQ("    {\n    }\n", Section(text, "VisitContainingObject(vesk::IObjectVisitor& _v) const\n", "    virtual"));
-  EXPECT_EQ(R"(    {
-        S const* _self = CONST_ATTRIB_CAST(S,d);
-        _self->d_calc();
-        return true;
-    }
-    virtual bool IsEvictable() const
-    {
-        return true;
-    }
-    void read() const { ReadBarrier(); }
-    void operator()() const { ReadBarrier(); }
-} d;
-
-)",
-            Section(text, "RecalcCache() const\n", ""));
-}
-
 TEST_F(DepFieldsTest, ShortBodies) {
   const auto bodyOf = [this](const std::string& definition) {
     return Section(Body("$dep int32 a = " + definition + "\n"), "void a_calc(vesk::int32& a) const\n{\n", "}\nmutable");
@@ -73,11 +15,6 @@ TEST_F(DepFieldsTest, ShortBodies) {
   EXPECT_EQ("    a = vesk::DollarNew(new X(1))->n + S::k\n", bodyOf("$new X(1)->n + $$::k;"));
   EXPECT_EQ("    a = this->GetThisAsFinalClass()->b;\n", bodyOf("{ a = $this->b; };"));
   EXPECT_EQ("    if (x) { a = 1; } // one\n", bodyOf("{ if (x) { a = 1; } // one\n };"));
-}
-
-TEST_F(DepFieldsTest, IndepWithSections) {
-  EXPECT_EQ(Golden("dep_fields_indep_with_sections"),
-            Body("$indep int* w create { } destroy { } evictable { return false; } evict { };\n"));
 }
 
 TEST_F(DepFieldsTest, VisitingOfTheContainingObject) {
@@ -94,48 +31,6 @@ TEST_F(DepFieldsTest, VisitingOfTheContainingObject) {
 }
 
 // --- $evict, $visit
-
-TEST_F(DepFieldsTest, BlocksOfClassWithoutRegistration) {
-  EXPECT_EQ(R"(void EvictDgsNodes_extra() const
-{ S::drop(); } 
-
-void VisitObjects(vesk::IObjectVisitor& v) const
-{
-    v << this->GetThisAsFinalClass();
-}
-
-)",
-            Body("$evict { $$::drop(); } $visit { v << $this; }\n"));
-  EXPECT_EQ(
-      "\nvoid VisitObjects(vesk::IObjectVisitor& v) const\n{\n    BaseClass::VisitObjects(v);\n    v << x;\n}\n\n",
-      Body("$visit { v << x; }\n", "$mixin S"));
-}
-
-TEST_F(DepFieldsTest, VisitBlockMakesVisitable) {
-  const Generated generated = TranslateHeader("$struct+ S { $visit { } };\n");
-  EXPECT_NE(std::string::npos, generated.header.find("operator<<(vesk::IObjectVisitor& _v,S const& _x)"));
-  EXPECT_NE(std::string::npos, generated.tail.find("vesk::VisitObjectsInArray<S>,\n"));
-}
-
-TEST_F(DepFieldsTest, BlocksOfClassWithRegistration) {
-  const std::string text = "namespace n { $class+ S\n{//\n$evict { drop(); }\n$visit { v << x;\nv << y; }\n}; }\n";
-  const Generated generated = TranslateHeader(text);
-  EXPECT_NE(std::string::npos, generated.header.find("//\nvoid EvictDgsNodes_extra() const;\n\n\n"
-                                                     "void VisitObjects(vesk::IObjectVisitor& v) const;\n\n"))
-      << generated.header;
-  EXPECT_NE(std::string::npos, generated.tail.find(R"(    void n::S::EvictDgsNodes_extra() const
-    {
-        drop();
-    }
-    void n::S::VisitObjects(vesk::IObjectVisitor& v) const
-    {
-        v << x;
-        v << y;
-    }
-    
-    // Registration of $class+ n::S
-)")) << generated.tail;
-}
 
 TEST_F(DepFieldsTest, Errors) {
   const std::vector<ErrorCase> cases = {

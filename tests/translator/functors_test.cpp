@@ -15,42 +15,6 @@ class FunctorsTest : public TranslateTest {
   }
 };
 
-TEST_F(FunctorsTest, Class) {
-  AssertGenerated("$functor+ bool F(int32 a = 1, string8 const& b) : [ 7 ];\n",
-                  Golden("functors_class") + TraitsText("F", "functor", "1111") + "} // namespace vesk\n;\n",
-                  TailText("$functor+ F", R"(    vesk::ReflectedFunctor const& _GetReflected(F const*)
-    {
-        static const vesk::octet_t F_metadata[] = { 0xe1,0xa2,0x07,0x00,0x00,0x00 };
-        static const vesk::octet_t F_return[] = { 0x01 };
-        static const vesk::octet_t F_a[] = { 0x04 };
-        static const vesk::octet_t F_b[] = { 0x36,0x31,0x10 };
-        static const vesk::ReflectedArg F_args[] = { { "a", F_a }, { "b", F_b }, };
-        static const vesk::ReflectedFunctor F_functor =
-        {
-            "F",
-            {F_return},
-            F_args,2,
-            F_metadata,
-            0,
-        };
-        return F_functor;
-    }
-)") + RegistrationText("$functor+ F", "Functor"));
-}
-
-TEST_F(FunctorsTest, WithoutResultOrArguments) {
-  const Generated generated = TranslateHeader("$functor void G();\n");
-  EXPECT_NE(std::string::npos, generated.header.find("typedef void (__stdcall *STUB_FN)(void* _self);\n"));
-  EXPECT_NE(std::string::npos, generated.header.find("    void operator()() { m_stubFn(m_self); }\n"));
-  EXPECT_EQ("", generated.tail);
-}
-
-TEST_F(FunctorsTest, InClassBodyHasNoTraits) {
-  const std::string header = TranslateHeader("struct Before;\n$struct S\n{\n    $functor void G();\n};\n").header;
-  EXPECT_EQ(std::string::npos, header.find("TypeTraits<G>")) << header;
-  EXPECT_NE(std::string::npos, header.find("{ f.write(os); return os; }\n;\n")) << header;
-}
-
 TEST_F(FunctorsTest, PlainInstances) {
   EXPECT_EQ(R"(void use()
 {

@@ -27,24 +27,6 @@ TEST_F(GlobalsTest, DeclarationsInSeveralFiles) {
                       "$function void g(f* a) { }\n"));
 }
 
-TEST_F(GlobalsTest, FunctionRecord) {
-  MakeWorld(TargetType::DynamicLinkLibrary);
-  AddFile("t.cpp", R"(namespace n
-{
-$function+ string8 Find(int32 key : [ "k" ], string8 const& more = "") : [ 7 ] { return more; }
-$function+ void Stop();
-$function+ void Stop() { }
-}
-)");
-  EXPECT_EQ(Golden("globals_function_record"), Folded(Translate("t.cpp")));
-}
-
-TEST_F(GlobalsTest, RecordsOnlyOfDefinedAndRegistered) {
-  EXPECT_EQ("", TranslateHeader("$function+ void f(); $function <<reflect>> inline void g() { } "
-                                "$var <<reflect>> int32 v; $typedef+ <<-register>> int32 T;")
-                    .tail);
-}
-
 TEST_F(GlobalsTest, FunctionMessages) {
   AssertMessages({
       {"$function void f();\n$function int32 f(int32 a);",

@@ -11,25 +11,6 @@ $interface+ L : A { };
 $interface+ D : [ "doc" ] : K, L { void d(const string8& s, int32 n=3); int32 v; };
 )";
 
-TEST_F(InterfacesTest, DiamondWithAttributes) {
-  const Generated generated = TranslateHeader(kDiamond);
-  EXPECT_EQ(Section(generated.header, "struct D\n", ""), Golden("interfaces_diamond_with_attributes") +
-                                                             TraitsText("D", "interface", "1111") +
-                                                             R"(template<> struct InterfaceTypeTraits<D>
-{
-    static const bool is_ipc = false;
-    static const bool is_rmi = false;
-};
-template<> struct _is_direct_superinterface_of<K,D> { static const bool value = true; };
-template<> struct _is_direct_superinterface_of<L,D> { static const bool value = true; };
-template<> struct _is_indirect_superinterface_of<A,D> { static const bool value = true; };
-} // namespace vesk
-
-)");
-  EXPECT_EQ(Folded(Section(generated.tail, "_GetReflected(D const*)\n", "    \n    // Registration")),
-            Golden("interfaces_diamond_with_attributes_tail"));
-}
-
 TEST_F(InterfacesTest, AttributesBecomeMethods) {
   const struct {
     const char *attribute, *slots;
@@ -68,50 +49,6 @@ TEST_F(InterfacesTest, AttributesBecomeMethods) {
             "        {\n            0x04\n        }");
   EXPECT_EQ(Section(TranslateHeader("$interface+ I { int32 : [ 7 ] x; };\n").tail, "I_Setx_x[] =\n", ";"),
             "        {\n            0xe1,0xa2,0x07,0x00,0x00,0x00,0x04\n        }");
-}
-
-// In a handle the key proxies answer by value; a constant attribute keeps the const operator[] alone.
-TEST_F(InterfacesTest, ProxiesOfAttributes) {
-  EXPECT_EQ(Section(TranslateHeader("$interface I { const xmap<string8,string8> m; };\n").header, "    union\n    {\n",
-                    "        void*"),
-            R"(        struct
-        {
-            operator vesk::xmap<vesk::string8,vesk::string8 > const() const { return CONST_ATTRIB_CAST(I,m)->Getm(); }
-            struct mElement
-            {
-                mElement(I* _self, vesk::string8 _k) : _self(_self),_k0(_k) {}
-                vesk::Path GetmElementPath() const { return _self->GetmElementPath(_k0); }
-                vesk::string8 const& _model__mElement() const { return _self->_model__mElement(_k0); }
-                vesk::string8& _model__mElement() { return _self->_model__mElement(_k0); }
-                vesk::string8 const& GetmElement() const { return _self->GetmElement(_k0); }
-                operator vesk::string8() const { return _self->GetmElement(_k0); }
-                I* _self;
-                vesk::string8 _k0;
-            };
-            mElement const operator[](vesk::string8 _k0) const
-            {
-                return mElement(const_cast<I*>(CONST_ATTRIB_CAST(I,m)),_k0);
-            }
-        } m;
-)");
-}
-
-TEST_F(InterfacesTest, Empty) {
-  EXPECT_EQ(Section(TranslateHeader("$interface I { };\n").header, "        static const FnTable& GetTable()\n",
-                    "    };\n    \n"),
-            "        {\n            static const FnTable t = {};\n            return t;\n        }\n");
-}
-
-TEST_F(InterfacesTest, Nested) {
-  const std::string header = TranslateHeader("$class C\n{\n    $interface I { void f(); };\n    int x;\n};\n").header;
-  EXPECT_EQ(Section(header, "class C\n{\n", "        void (__stdcall"), "    struct I\n{\n    struct FnTable\n    {\n");
-  EXPECT_EQ(Section(header, "{ BC::GetI().f(); }\n", "\npublic"), "};\n\n    int x;\n");
-  EXPECT_EQ(header.find("TypeTraits<I>"), header.npos);
-  EXPECT_EQ(Section(TranslateHeader("$class C {\n$interface I { void f(); };\n"
-                                    "$struct N : mixin [ IDelegatorMixin ] { I GetI(); };\n};")
-                        .header,
-                    "struct N", "\n"),
-            " : public IDelegatorMixin<vesk::BaseMixin<N,vesk::EmptyBase> >");
 }
 
 TEST_F(InterfacesTest, ClassThatImplementsADerivedInterface) {

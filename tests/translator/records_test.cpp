@@ -26,63 +26,6 @@ TEST_F(RecordsTest, NothingToRegister) {
   EXPECT_EQ("", TranslateHeader("$struct A { $int32 x; }; $type int8; $type+<<-register>> int16;").tail);
 }
 
-TEST_F(RecordsTest, TypeRegistrations) {
-  MakeWorld(TargetType::DynamicLinkLibrary);
-  settings.systemName = "Linux";
-  const Generated generated = TranslateHeader(
-      "$struct S { };\nnamespace a { namespace b {\n$type+ const S*;\n$type<<register>> xvector<int32>; } }\n"
-      "$type <<reflect>> bool ; int x;\n");
-  EXPECT_EQ(
-      "namespace a { namespace b {\n"
-      "app_API vesk::ReflectionByteCode _GetReflected(S const* const*);\n"
-      "app_API vesk::TypeOps const& _GetTypeOps(S const* const*);\n"
-      "\n"
-      "app_API vesk::ReflectionByteCode _GetReflected(vesk::xvector<vesk::int32> const*);\n"
-      "app_API vesk::TypeOps const& _GetTypeOps(vesk::xvector<vesk::int32> const*);\n"
-      " } }\n"
-      "vesk::ReflectionByteCode _GetReflected(bool const*);\n"
-      "vesk::TypeOps const& _GetTypeOps(bool const*);\n"
-      " int x;\n",
-      generated.header.substr(generated.header.find("namespace a { namespace b {")));
-
-  const std::string head =
-      "namespace a\n{\nnamespace b\n{\n"
-      "vesk::ReflectionByteCode _GetReflected(S const* const*)\n"
-      "{\n"
-      "    static const vesk::octet_t bc[] =\n    {\n        0x35,0x31,0x20,0x00,0x00\n    };\n"
-      "    static vesk::ConstStringZ _stringTable[] =\n    {\n        \"S\",\n    };\n"
-      "    return vesk::ReflectionByteCode(bc,_stringTable);\n"
-      "}\n"
-      "vesk::TypeOps const& _GetTypeOps(S const* const*)\n"
-      "{\n"
-      "    static vesk::TypeOps typeOps =\n"
-      "    {\n"
-      "        sizeof(S const*),\n"
-      "        (vesk::CompareVariableFn) (bool (*)(S const* const*, S const* const*)) vesk::VariableEqual<S const*>,\n";
-  EXPECT_EQ(head, generated.tail.substr(0, head.size()));
-  const std::string foot =
-      "    };\n    return typeOps;\n}\n"
-      "void _Register_xvector_int32()\n"
-      "{\n"
-      "    vxVerify(vesk::RegisterTypeOps(vesk::ReflectionByteCodeValue(_GetReflected((vesk::xvector<vesk::int32>*)0)),"
-      "&_GetTypeOps((vesk::xvector<vesk::int32>*)0)));\n"
-      "}\n"
-      "} // b\n} // a\n";
-  ASSERT_GE(generated.tail.size(), foot.size());
-  EXPECT_EQ(foot, generated.tail.substr(generated.tail.size() - foot.size()));
-  EXPECT_EQ((std::vector<std::string>{"a::b::ptr_S", "a::b::xvector_int32"}),
-            host->RegisterMap().entries["app/src/t.cpp"]);
-}
-
-// A type that is not reflected need not be understood.
-TEST_F(RecordsTest, UnreflectedTypes) {
-  AssertHeader("$type int;$type <<-reflect>> std::vector<int>*;", R"(vesk::ReflectionByteCode _GetReflected(int const*);
-vesk::TypeOps const& _GetTypeOps(int const*);
-vesk::ReflectionByteCode _GetReflected(std::vector<int>* const*);
-vesk::TypeOps const& _GetTypeOps(std::vector<int>* const*);
-)");
-}
-
 TEST_F(RecordsTest, TypeErrors) {
   EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$type int32;"));
   AssertErrors({

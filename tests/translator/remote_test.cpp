@@ -18,43 +18,6 @@ class RemoteTest : public TranslateTest {
   }
 };
 
-TEST_F(RemoteTest, IpcIsAStubAndAScion) {
-  EXPECT_EQ(Section(Folded(TranslateHeader(Declared("ipc")).tail), "} // n\n", "    ~ScionJFactory"),
-            Golden("remote_ipc_is_a_stub_and_a_scion"));
-  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
-            (std::vector<std::string>{"n::J", "n::StubJ", "n::ScionJ"}));
-}
-
-TEST_F(RemoteTest, RmiIsAStubAndASkeleton) {
-  std::string expected = TranslateHeader(Declared("ipc")).tail;
-  ReplaceAllInPlace(expected, "Scion", "Skeleton");
-  ReplaceAllInPlace(expected, "(vesk::Archive& _ar, void** _p)", "(vesk::InputArchive& _ar, void** _p)");
-  ReplaceAllInPlace(expected, "J& Invoke()", "vesk::ptr<J> Invoke()");
-  ReplaceAllInPlace(expected, "reinterpret_cast<J&>(m_delegate)",
-                    "vesk::ptr<J>(m_delegate.m_self, m_delegate.m_table)");
-  EXPECT_EQ(TranslateHeader(Declared("ipc rmi")).tail, expected);
-  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
-            (std::vector<std::string>{"n::J", "n::StubJ", "n::SkeletonJ"}));
-}
-
-// A remote interface needs its stubs also where it has no record.
-TEST_F(RemoteTest, WithoutReflection) {
-  const std::string declarations = "$interface rmi J { };\n";
-  const std::string header = TranslateHeader(declarations).header;
-  EXPECT_EQ(Section(header, "struct JDelegatorMixin : public BC\n", "\n\nnamespace"),
-            "{\n};\n\ninline vesk::ConstStringZ _GetIpcInterfaceName(J const*) { return \"J\"; }");
-  EXPECT_EQ(Section(header, "InterfaceTypeTraits<J>\n", "} // namespace vesk"),
-            "{\n    static const bool is_ipc = true;\n    static const bool is_rmi = true;\n};\n");
-  EXPECT_EQ(Section(TranslateHeader(declarations).tail, "", "    StubJ() : Stub(vesk::ptr<J>(this),0) {}\n"),
-            "\n//### Registration of stub/scion of $interface J\nstruct StubJ : vesk::Stub\n{\n");
-}
-
-TEST_F(RemoteTest, InAnUnnamedNameSpace) {
-  TranslateHeader("namespace { $interface ipc J { }; namespace n { $interface rmi K { }; } }\n");
-  EXPECT_EQ(host->RegisterMap().entries.at("app/src/t.cpp"),
-            (std::vector<std::string>{"StubJ", "ScionJ", "n::StubK", "n::SkeletonK"}));
-}
-
 TEST_F(RemoteTest, Faults) {
   const std::vector<ErrorCase> cases = {
       {"void f(int32 a);", 2, "[in] or [out] expected when read int32"},

@@ -112,14 +112,6 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     host = std::make_unique<TestHost>(*workspace, *app().configs.front());
   }
 
-  // Generated text that is too long to stand in a test.
-  static std::string Golden(const std::string& name) {
-    const std::string path = std::string(QREX_SOURCE_DIR "/tests/translator/golden/") + name + ".txt";
-    std::string text;
-    EXPECT_TRUE(ReadWholeFile(text, path)) << path;
-    return text;
-  }
-
   void OnTrace(std::string_view text) override { trace.append(text); }
   Project& app() { return *workspace->projects.front(); }
 
@@ -221,30 +213,6 @@ class TranslateTest : public ::testing::Test, public TraceHook {
   static std::string TailText(const std::string& element, const std::string& record) {
     return "\n//### " + element + "\nnamespace vesk { XTarget* app_GetXTarget(); }\n" + record;
   }
-  static std::string RegistrationText(const std::string& element, const std::string& kind) {
-    const std::string name = element.substr(element.find(' ') + 1);
-    return "    \n    // Registration of " + element + "\n    void _Register_" + name +
-           "()\n    {\n        vxVerify(vesk::RegisterReflected" + kind + "(&_GetReflected( (" + name +
-           "*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);\n    }\n";
-  }
-
-  // The traits of an element up to the end of the name space. `flags`: exported, reflected, registered, metadata;
-  // behind them, of a class, those of its ClassTypeTraits in order.
-  static std::string TraitsText(const std::string& name, const std::string& kind, const std::string& flags) {
-    std::istringstream names(
-        "is_exported is_reflected is_registered has_metadata has_reflected_default_ctor has_reflected_dtor "
-        "has_reflected_copy_ctor has_reflected_equality has_reflected_compare has_reflected_write_xostream "
-        "has_reflected_serialise has_reflected_visit_IObjects has_reflected_visit_Prefs implements_IObject "
-        "implements_IPersistable can_serialise_model has_model using_model_base_class");
-    std::string text = "namespace vesk\n{\ntemplate<> struct TypeTraits<" + name + ">\n{\n", flag;
-    for (size_t i = 0; i < flags.size() && names >> flag; ++i) {
-      if (i == 3) text += "    static const vesk::ETypeTraitKind kind = vesk::TTK_" + kind + ";\n";
-      if (i == 4) text += "};\ntemplate<> struct ClassTypeTraits<" + name + ">\n{\n";
-      text += "    static const bool " + flag + " = " + flags[i] + ";\n";
-    }
-    return text + "};\n";
-  }
-
   // The printed form of the error that the translation of `text` raises.
   std::string ErrorOf(const std::string& name, const std::string& text) {
     try {

@@ -7,36 +7,6 @@ namespace {
 
 using VariantsTest = TranslateTest;
 
-TEST_F(VariantsTest, EverySortOfItem) {
-  AssertGenerated(
-      R"($variant+ V <<-compare>> : [ 7 ]
-{
-    default x("a");
-    int32;
-    string8 x;
-    void none;
-    *pref<vesk::IObject> ref;
-    { int32 a; string8 b; } s;
-    *{ pref<vesk::IObject> p; } h;
-};
-)",
-      Golden("variants_every_sort_of_item") + TraitsText("V", "variant", "1111") + "} // namespace vesk\n\n",
-      TailText("$variant+ V", Golden("variants_every_sort_of_item_tail")) + RegistrationText("$variant+ V", "Variant"));
-}
-
-TEST_F(VariantsTest, OnlyVoidItems) {
-  const std::string text = TranslateHeader("$variant E <<-os -ar>> { void a; void; };\n").header;
-  EXPECT_EQ(R"(    bool is(a*) const { return _tag == 0; }
-    bool is(void*) const { return _tag == 1; }
-    vesk::int32 _tag;
-};
-template <> struct E::_mapvalue_<void > { enum { tag=1 }; typedef void Value; };
-)",
-            Section(text, "    private:\n", "inline vesk::IObjectVisitor"));
-  for (const char* absent : {" as()", "Write", "Serialise", "switch"})
-    EXPECT_EQ(std::string::npos, text.find(absent)) << absent;
-}
-
 TEST_F(VariantsTest, Serialisability) {
   const auto serialises = [this](const std::string& declarations) {
     const std::string header = TranslateHeader(declarations).header;
@@ -51,31 +21,6 @@ TEST_F(VariantsTest, Serialisability) {
   EXPECT_FALSE(serialises("$variant W <<-ar>> { int32; }; $variant V { W w; };"));
   EXPECT_FALSE(serialises("$variant W <<-ser>> { int32; }; $variant V { W w; };"));
   EXPECT_TRUE(serialises("$variant W <<ser -ar>> { int32; }; $variant V { W w; };"));
-}
-
-TEST_F(VariantsTest, NamesOfItemsInRecords) {
-  const std::string tail =
-      TranslateHeader("$variant+ V { xmap<int32,string8>; int32 const*; ptr<ptr<vesk::IObject>>&; };").tail;
-  for (const char* name :
-       {"V_tag_vesk_8__8_xmap_6_vesk_8__8_int32_vesk_8__8_string8_9_[]", "V_tag_vesk_8__8_int32const_ptr_[]",
-        "V_tag_vesk_8__8_ptr_6_vesk_8__8_ptr_6_vesk_8__8_IObject_9__9__ref_[]"}) {
-    EXPECT_NE(std::string::npos, tail.find(name)) << name << " in:\n" << tail;
-  }
-}
-
-TEST_F(VariantsTest, Destructors) {
-  const std::string header =
-      TranslateHeader(
-          "$enum E { a }; namespace n { $typedef xvector<int32> T; }\n$variant V "
-          "{ E; n::T t; xmap<int32,bool> m; std::map<int, std::string> s; A<b::C>::D d; int8; };")
-          .header;
-  EXPECT_EQ(R"(        case 0 : as<E >().E::~E(); break;
-        case 1 : as<t >().n::T::~T(); break;
-        case 2 : as<m >().vesk::xmap<vesk::int32,bool >::~xmap(); break;
-        case 3 : as<s >().std::map<int, std::string>::~map<int, std::string>(); break;
-        case 4 : as<d >().A<b::C>::D::~D(); break;
-)",
-            Section(header, "inline V::~V()\n{\n    switch(_tag)\n    {\n", "    }\n"));
 }
 
 TEST_F(VariantsTest, Messages) {
@@ -120,14 +65,6 @@ TEST_F(VariantsTest, Errors) {
 // --- $polymorphic
 
 const char kTwoVariants[] = "$variant A { int32; void n; };\n$variant B { string8 x; { bool f; } s; };\n";
-
-TEST_F(VariantsTest, PolymorphicFunctions) {
-  const std::string header = TranslateHeader(std::string(kTwoVariants) +
-                                             "$polymorphic int32 f([A a], bool flag = true, [B const& b]);\n"
-                                             "$polymorphic inline void g([A& a]);\n")
-                                 .header;
-  EXPECT_EQ(Golden("variants_polymorphic_functions"), Section(header, "vesk::int32 f(", ""));
-}
 
 TEST_F(VariantsTest, PolymorphicErrors) {
   AssertErrors({

@@ -1,0 +1,3 @@
+@import "Vesk/vxObject/IObject.h"
+$struct A
+{$$() { $$ * p; if (x) { } }};

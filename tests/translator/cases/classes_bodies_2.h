@@ -1,0 +1,3 @@
+@import "Vesk/vxObject/IObject.h"
+$struct A
+{void f() { g($this, $this); h($new B(1)); }};

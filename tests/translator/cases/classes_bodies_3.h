@@ -1,0 +1,3 @@
+@import "Vesk/vxObject/IObject.h"
+$struct A
+{$std::map<int,int> m; /* $ } */};

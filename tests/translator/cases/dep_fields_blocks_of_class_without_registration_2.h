@@ -1,0 +1,6 @@
+@import "Vesk/vxObject/IObject.h"
+$mixin S
+{//
+$visit { v << x; }
+int end;
+};

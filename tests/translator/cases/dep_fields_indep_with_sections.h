@@ -1,0 +1,6 @@
+@import "Vesk/vxObject/IObject.h"
+$struct S
+{//
+$indep int* w create { } destroy { } evictable { return false; } evict { };
+int end;
+};

@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$struct+ S { $visit { } };

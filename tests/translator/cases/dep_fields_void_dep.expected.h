@@ -1,0 +1,81 @@
+#pragma once
+#ifndef _app_src_t_h
+#define _app_src_t_h
+
+#include "Vesk/vxObject/IObject.h"
+struct S;
+
+namespace vesk
+{
+template<> struct TypeTraits<S>
+{
+    static const bool is_exported = 0;
+    static const bool is_reflected = 0;
+    static const bool is_registered = 0;
+    static const vesk::ETypeTraitKind kind = vesk::TTK_struct;
+    static const bool has_metadata = 0;
+};
+template<> struct ClassTypeTraits<S>
+{
+    static const bool has_reflected_default_ctor = 0;
+    static const bool has_reflected_dtor = 0;
+    static const bool has_reflected_copy_ctor = 0;
+    static const bool has_reflected_equality = 0;
+    static const bool has_reflected_compare = 0;
+    static const bool has_reflected_write_xostream = 0;
+    static const bool has_reflected_serialise = 0;
+    static const bool has_reflected_visit_IObjects = 0;
+    static const bool has_reflected_visit_Prefs = 0;
+    static const bool implements_IObject = 0;
+    static const bool implements_IPersistable = 0;
+    static const bool can_serialise_model = 0;
+    static const bool has_model = 0;
+    static const bool using_model_base_class = 0;
+};
+} // namespace vesk
+struct S
+{//
+void d_calc() const
+{
+    go();
+    done();
+}
+struct Depnode_d : vesk::DGDepNode
+{
+    typedef void value_type;
+    Depnode_d() : vesk::DGDepNode(vesk::DF_SYNC_DEP|vesk::DF_PROPAGATE_HARD_DIRTINESS) {}
+    virtual vesk::ssize_t ByteSize() const
+    {
+        return 0;
+    }
+    virtual vesk::xstring Name() const { return "S::d"; }
+    virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
+    {
+    }
+    virtual bool RecalcCache() const
+    {
+        S const* _self = CONST_ATTRIB_CAST(S,d);
+        _self->d_calc();
+        return true;
+    }
+    virtual bool IsEvictable() const
+    {
+        return true;
+    }
+    void read() const { ReadBarrier(); }
+    void operator()() const { ReadBarrier(); }
+} d;
+
+int end;
+
+public:
+    void EvictDgsNodes() const
+    {
+        d.TryEvict(false);
+    }
+    
+};
+
+
+
+#endif // include guard

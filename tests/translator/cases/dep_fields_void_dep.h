@@ -1,0 +1,7 @@
+@import "Vesk/vxObject/IObject.h"
+$struct S
+{//
+$dep void d = { go();
+done(); };
+int end;
+};

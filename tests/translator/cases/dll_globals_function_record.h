@@ -1,0 +1,1 @@
+@import "Vesk/vxObject/IObject.h"

@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$enum E <<reflect>> { a, -b = 7 };

@@ -1,0 +1,3 @@
+@import "Vesk/vxObject/IObject.h"
+$enum class C { };
+$enum+ P <<-register extern>> { };

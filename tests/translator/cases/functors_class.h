@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$functor+ bool F(int32 a = 1, string8 const& b) : [ 7 ];

@@ -1,0 +1,6 @@
+@import "Vesk/vxObject/IObject.h"
+struct Before;
+$struct S
+{
+    $functor void G();
+};

@@ -1,0 +1,5 @@
+@import "Vesk/vxObject/IObject.h"
+$interface+ A { void a(int32 i); };
+$interface+ K : A { int32 k() const; };
+$interface+ L : A { };
+$interface+ D : [ "doc" ] : K, L { void d(const string8& s, int32 n=3); int32 v; };

@@ -1,0 +1,20 @@
+#include "t.h"
+
+//### $model M
+namespace vesk { XTarget* app_GetXTarget(); }
+namespace vesk { RSN app_GetModelRsn(); }
+    void M::EvictDgsNodes() const {vesk::DataSourceEvict(&a);vesk::DataSourceEvict(&b);vesk::DataSourceEvict(&c);}
+    void M::VisitObjects(vesk::IObjectVisitor& _v) const {}
+    void M::VisitPrefs(vesk::IPrefVisitor& _v) const {}
+    void M::Serialise(vesk::Archive& _ar) const
+    {
+        _ar << this->a
+           << this->b
+           << this->c;
+    }
+    void M::Deserialise(vesk::InputArchive& _ar)
+    {
+        _ar >> this->a
+           >> this->b
+           >> this->c;
+    }

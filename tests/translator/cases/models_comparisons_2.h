@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$model M { };

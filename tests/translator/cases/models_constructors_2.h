@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$model M { int32 a; $$() { a = 7; } };

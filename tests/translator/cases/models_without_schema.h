@@ -1,0 +1,5 @@
+@import "Vesk/vxObject/IObject.h"
+$model Point
+{
+    string8 name;
+};

@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$type int;$type <<-reflect>> std::vector<int>*;

@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$variant E <<-os -ar>> { void a; void; };

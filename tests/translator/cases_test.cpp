@@ -1,0 +1,62 @@
+// Whole generated texts. A case is a header `cases/NAME.h` and what comes of it, `NAME.expected.h`; with the `.cpp`
+// that imports the header, `NAME.cpp` (or an empty one), and what comes of that, `NAME.expected.cpp`, if it is more
+// than the import. Names that begin with `dll_` or `compilable_` say what the project or its configuration is.
+//
+// `scripts/test --update` writes what is expected anew, and shows what changed.
+#include <cstdlib>
+#include <filesystem>
+
+#include "translator/translate_fixture.h"
+
+namespace qrex {
+namespace {
+
+const std::string kFolder = QREX_SOURCE_DIR "/tests/translator/cases/";
+
+std::vector<std::string> CaseNames() {
+  std::vector<std::string> names;
+  for (const auto& entry : std::filesystem::directory_iterator(kFolder)) {
+    const std::string name = entry.path().filename();
+    if (name.ends_with(".h") && !name.ends_with(".expected.h")) names.push_back(name.substr(0, name.size() - 2));
+  }
+  std::sort(names.begin(), names.end());
+  return names;
+}
+
+std::string TextOf(const std::string& path) {
+  std::string text;
+  LoadText(text, path, true);
+  return text;
+}
+
+class CasesTest : public TranslateTest, public ::testing::WithParamInterface<std::string> {
+ protected:
+  // Or, when asked for, makes `text` what is expected; an empty text has no file.
+  static void Compare(const std::string& path, const std::string& text) {
+    const std::string expected = TextOf(path);
+    if (text == expected || !std::getenv("QREX_UPDATE")) {
+      EXPECT_EQ(expected, text) << path;
+    } else if (text.empty()) {
+      std::filesystem::remove(path);
+    } else {
+      ReplaceFile(path, text);
+    }
+  }
+};
+
+TEST_P(CasesTest, GivesWhatIsExpected) {
+  const std::string& name = GetParam();
+  settings.compilableText = name.starts_with("compilable_");
+  MakeWorld(name.starts_with("dll_") ? TargetType::DynamicLinkLibrary : TargetType::Application);
+  const std::string import = "@import \"t.h\"\n", source = TextOf(kFolder + name + ".cpp");
+  AddFile("t.h", TextOf(kFolder + name + ".h"));
+  AddFile("t.cpp", source.empty() ? import : source);
+  Compare(kFolder + name + ".expected.h", Translate("t.h"));
+  const std::string translated = Translate("t.cpp");
+  Compare(kFolder + name + ".expected.cpp", translated == "#include \"t.h\"\n" ? "" : translated);
+}
+
+INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& info) { return info.param; });
+
+}  // namespace
+}  // namespace qrex
