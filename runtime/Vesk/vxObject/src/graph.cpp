@@ -1,4 +1,5 @@
-// How nodes are linked, become dirty and are brought up to date.
+// How nodes are linked, become dirty and are brought up to date. `inline` are steps of a calculation that are taken
+// nowhere else.
 
 @import "Vesk/vxObject/Graph.h"
 
@@ -23,7 +24,7 @@ void GraphState::Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSe
 void GraphState::Unwind(DGNode const* node) {
   if (!m_targets.empty()) m_unwound[node] = m_targets.back().m_serial;
 }
-bool GraphState::IsWaiting(DGNode const* node) const {
+inline bool GraphState::IsWaiting(DGNode const* node) const {
   const auto at = m_unwound.find(node);
   if (at == m_unwound.end() || m_targets.empty() || at->second == m_targets.back().m_serial) return false;
   const auto target = std::lower_bound(m_targets.begin(), m_targets.end(), at->second,
@@ -31,7 +32,7 @@ bool GraphState::IsWaiting(DGNode const* node) const {
   return target != m_targets.end() && target->m_serial == at->second;
 }
 
-bool GraphState::IsDeep() const {
+inline bool GraphState::IsDeep() const {
   const std::uintptr_t here = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
   return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > MostCalculationStack;
 }
@@ -130,7 +131,7 @@ DGNode::~DGNode() {
 
 // --- What is dirty
 
-void DGNode::Mark(GraphState& state, bool hard, xvector<DGNode const*>& dirty) const {
+inline void DGNode::Mark(GraphState& state, bool hard, xvector<DGNode const*>& dirty) const {
   if (m_isCalculating) {
     bool& again = state.m_again[this];
     again = again || hard;
@@ -314,7 +315,7 @@ void Calculation::Forget(DGNode const* node, DGNode const* input) {
   }
 }
 
-bool Calculation::IsNew(DGNode const* input) {
+inline bool Calculation::IsNew(DGNode const* input) {
   const auto& inputs = m_node->m_inputs;
   const std::size_t few = 16;
   if (m_inputs.empty() && inputs.size() < few) {
@@ -356,13 +357,13 @@ void GraphState::End() {
 
 // --- Eviction queues
 
-void DGNode::JoinQueue(GraphState& state) const {
+inline void DGNode::JoinQueue(GraphState& state) const {
   m_queue = &state.m_queues[EvictionQueueIndex()];
   m_queue->m_byteSize += m_byteSize;
   m_queuePlace = m_queue->m_nodes.insert(m_queue->m_nodes.end(), this);
   state.Use();
 }
-void DGNode::LeaveQueue() const {
+inline void DGNode::LeaveQueue() const {
   EvictionQueue* queue = std::exchange(m_queue, nullptr);
   if (!queue) return;
   queue->m_byteSize -= m_byteSize;
