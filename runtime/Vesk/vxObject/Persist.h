@@ -69,8 +69,10 @@ void Serialise(Archive& ar, cref<C> const& reference) {
 
 enum class EMention { Null, Known, New, NewWithContent };
 
+// What stands next; `number` is the object's, that of a new one included.
 EMention ReadMention(InputArchive& ar, std::size_t& number);
 
+// The content of the object at this position, unless it was read.
 void ReadContent(InputArchive& ar, std::size_t position);
 
 // Reads a number and what must follow it. Make: ReadObject(), of an object that the archive begins. Answers its
