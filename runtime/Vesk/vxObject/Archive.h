@@ -156,13 +156,24 @@ void ReadElements(InputArchive& ar, Array<T, N>& v, std::size_t) {
   for (T& item : v) ReadElement(ar, item);
 }
 
+template <typename T, typename Item>
+void AddElement(T& v, Item&& item) {
+  if constexpr (!ContainerTraits<T>::keyed) {
+    v.push_back(std::move(item));
+  } else if constexpr (HasLess<typename T::key_type>) {
+    v.insert(v.end(), std::move(item));
+  } else {
+    throw ArchiveError("keys without an order");
+  }
+}
+
 template <typename T>
 void ReadElements(InputArchive& ar, T& v, std::size_t count) {
   v.clear();
   for (std::size_t i = 0; i < count; ++i) {
     typename ContainerTraits<T>::element_type item = typename ContainerTraits<T>::element_type();
     ReadElement(ar, item);
-    v.insert(v.end(), std::move(item));
+    AddElement(v, std::move(item));
   }
 }
 

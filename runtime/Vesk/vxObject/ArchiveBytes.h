@@ -72,14 +72,17 @@ class ByteBuffer {
   std::size_t m_capacity = 0;
 };
 
+struct InputArchive;
+
 // Writes into memory.
 struct Archive {
   void Write(void const* data, std::size_t size) { m_bytes.Append(data, size); }
 
   ByteBuffer m_bytes;
   WrittenObjects m_objects;
-  bool m_writesAddresses = false;                     // of objects, in place of the objects
-  bool m_hostOrder = false;                           // scalars as the host has them: for bytes that stay in memory
+  bool m_writesAddresses = false;    // of objects, in place of the objects
+  bool m_hostOrder = false;          // scalars as the host has them: for bytes that stay in memory
+  InputArchive* m_answer = nullptr;  // of an `ipc` call, whose results are read through an Archive
 };
 
 // What an archive may ask of its reader. Whatever takes bytes is bounded by the bytes that are left.

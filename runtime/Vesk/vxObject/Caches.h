@@ -28,6 +28,11 @@ class DGCacheNode : public Node {
   }
 
   mutable O _output = O();
+
+ protected:
+  // Only keyed nodes have these; the using-declarations of _GetFinalSelf name them for all.
+  void _self() const;
+  void _GetKey() const;
 };
 
 template <typename N, typename K>
@@ -232,3 +237,15 @@ class DGKeyedAsyncNodeOnInput : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>
 };
 
 }  // namespace vesk
+
+// Generated nodes name what they inherit without `this->`, which a template does not find in a base that depends on its
+// parameters: those of mixins and class templates. Every node declares _GetFinalSelf once, behind its typedef `base`;
+// the names are made its own in front of that. The declaration that is cut off belongs to a function that nobody calls.
+#define _GetFinalSelf()       \
+  _NoSelf() const;            \
+  using base::_output;        \
+  using base::_self;          \
+  using base::_GetKey;        \
+  using base::SetFlag;        \
+  using base::UpdateByteSize; \
+  const auto* _GetFinalSelf()

@@ -43,7 +43,8 @@ class Channel {
 // Two ends of a queue in each direction, for one thread.
 class LocalChannel {
  public:
-  LocalChannel() : m_ends{End(m_queues[0], m_queues[1]), End(m_queues[1], m_queues[0])} {}
+  LocalChannel();
+  ~LocalChannel();
   Channel& Client() { return m_ends[0]; }
   Channel& Server() { return m_ends[1]; }
 
@@ -52,13 +53,8 @@ class LocalChannel {
   class End : public Channel {
    public:
     End(Queue& out, Queue& in) : m_out(out), m_in(in) {}
-    void Send(xvector<octet_t> const& message) override { m_out.push_back(message); }
-    bool Receive(xvector<octet_t>& message) override {
-      if (m_in.empty()) return false;
-      message = std::move(m_in.front());
-      m_in.pop_front();
-      return true;
-    }
+    void Send(xvector<octet_t> const& message) override;
+    bool Receive(xvector<octet_t>& message) override;
 
    private:
     Queue& m_out;
@@ -71,8 +67,7 @@ class LocalChannel {
 // The largest message that either side sends or reads, unless told otherwise.
 constexpr std::size_t kMessageLimit = std::size_t(64) << 20;
 
-inline void CheckMessageSize(std::size_t size, std::size_t limit) {
-  if (size > limit) throw RemoteError(vxMakeString("message of " << size << " bytes, the limit is " << limit));
-}
+// RemoteError for a message that is too long.
+void CheckMessageSize(std::size_t size, std::size_t limit);
 
 }  // namespace vesk

@@ -124,6 +124,16 @@ class DynArray {
   T* m_items = nullptr;
 };
 
+namespace unqualified {
+using vesk::DynArray;
+using vesk::xbag;
+using vesk::xdeque;
+using vesk::xlist;
+using vesk::xmap;
+using vesk::xset;
+using vesk::xvector;
+}  // namespace unqualified
+
 // What the containers share: equality of the two arrays, order and printing as [a,b,c] of them all.
 template <typename T, ssize_t N>
 bool operator==(Array<T, N> const& a, Array<T, N> const& b) {
@@ -183,8 +193,28 @@ decltype(auto) AsElement(Item const& item) {
   }
 }
 
+// Whether a type offers something, by the parts that it consists of: containers and pairs declare their operators
+// whether their items have them or not.
+template <template <typename> class Offers, typename T, typename = void>
+struct PartsOffer : Offers<T> {};
+template <template <typename> class Offers, typename T>
+struct PartsOffer<Offers, T, std::enable_if_t<IsContainer<T>>>
+    : PartsOffer<Offers, typename ContainerTraits<T>::element_type> {};
+template <template <typename> class Offers, typename A, typename B>
+struct PartsOffer<Offers, std::pair<A, B>> : std::conjunction<PartsOffer<Offers, A>, PartsOffer<Offers, B>> {};
+
 template <typename T>
-using EqualItems = decltype(std::declval<T const&>() == std::declval<T const&>());
+using EqualExpression = decltype(std::declval<T const&>() == std::declval<T const&>());
+template <typename T>
+using LessExpression = decltype(std::declval<T const&>() < std::declval<T const&>());
+template <typename T>
+using OffersEqual = Detector<void, EqualExpression, T>;
+template <typename T>
+using OffersLess = Detector<void, LessExpression, T>;
+template <typename T>
+constexpr bool HasEqual = PartsOffer<OffersEqual, T>::value;
+template <typename T>
+constexpr bool HasLess = PartsOffer<OffersLess, T>::value;
 
 template <typename T>
 bool ItemLess(T const& a, T const& b) {
@@ -192,18 +222,23 @@ bool ItemLess(T const& a, T const& b) {
 }
 template <typename K, typename V>
 bool ItemLess(std::pair<K, V> const& a, std::pair<K, V> const& b) {
-  return a.first == b.first ? a.second < b.second : a.first < b.first;
+  if constexpr (HasEqual<K>) {
+    return a.first == b.first ? a.second < b.second : a.first < b.first;
+  } else {
+    return a.first < b.first || (!(b.first < a.first) && a.second < b.second);
+  }
 }
 
 // The first items that differ decide. They are found by `==`: to ask for a < b and b < a of each, as the standard
 // library does, takes twice the time for each level of containers within containers.
 template <typename T, typename = std::enable_if_t<IsContainer<T>>>
 bool operator<(T const& a, T const& b) {
-  if constexpr (Detects<EqualItems, typename ContainerTraits<T>::element_type>) {
+  if constexpr (HasEqual<T>) {
     const auto [at, other] = std::mismatch(a.begin(), a.end(), b.begin(), b.end());
     return other != b.end() && (at == a.end() || ItemLess(*at, *other));
   } else {
-    return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end());
+    return std::lexicographical_compare(a.begin(), a.end(), b.begin(), b.end(),
+                                        [](auto const& x, auto const& y) { return ItemLess(x, y); });
   }
 }
 

@@ -89,11 +89,7 @@ struct Calculation {
   // Whether the node has not read this input yet.
   bool IsNew(DGNode const* input);
   // The link from `input` to a node that is being calculated here or further out is gone.
-  void Forget(DGNode const* node, DGNode const* input) {
-    for (Calculation* at = this; at; at = at->m_outer) {
-      if (at->m_node == node) at->m_inputs.erase(input);
-    }
-  }
+  void Forget(DGNode const* node, DGNode const* input);
   // Whether this is memory of the calculation itself (its variables, its value), of which it cannot depend.
   bool Owns(void const* address);
 
@@ -127,14 +123,10 @@ class EvictionQueue {
 };
 
 struct GraphState : PerThread<GraphState> {
-  GraphState() {
-    for (EvictionQueue& queue : m_queues) queue.m_state = this;
-  }
+  GraphState();
+  ~GraphState();
 
-  void Begin() {
-    m_isEvaluating = true;
-    m_stack = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
-  }
+  void Begin();
   void End();
 
   // A node that the outermost read calculates; the one in front of it in the list wants it.
@@ -143,50 +135,23 @@ struct GraphState : PerThread<GraphState> {
     std::size_t m_serial;  // they ascend
     bool operator==(Target const& rhs) const { return m_serial == rhs.m_serial; }
   };
-  void Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
+  void Aim(DGNode const* node);
 
   // The calculation of a node was unwound: it waits for the next target, until its own one begins again.
-  void Unwind(DGNode const* node) {
-    if (!m_targets.empty()) m_unwound[node] = m_targets.back().m_serial;
-  }
-  bool IsWaiting(DGNode const* node) const {
-    const auto at = m_unwound.find(node);
-    if (at == m_unwound.end() || m_targets.empty() || at->second == m_targets.back().m_serial) return false;
-    const auto target = std::lower_bound(m_targets.begin(), m_targets.end(), at->second,
-                                         [](Target const& t, std::size_t serial) { return t.m_serial < serial; });
-    return target != m_targets.end() && target->m_serial == at->second;
-  }
+  void Unwind(DGNode const* node);
+  bool IsWaiting(DGNode const* node) const;
 
   // Whether what is read next must be calculated further out. Not what the outermost calculation reads: that is
   // there.
-  bool IsDeep() const {
-    const std::uintptr_t here = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
-    return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > MostCalculationStack;
-  }
+  bool IsDeep() const;
 
   // Lists of nodes that are being told: a node that is destroyed meanwhile leaves them.
   struct NotifyScope {
-    NotifyScope(GraphState& state, xvector<DGNode const*>& nodes) : m_state(state) {
-      state.m_notified.push_back(&nodes);
-    }
-    ~NotifyScope() { m_state.m_notified.pop_back(); }
+    NotifyScope(GraphState& state, xvector<DGNode const*>& nodes);
+    ~NotifyScope();
     GraphState& m_state;
   };
-  void OnDestroy(DGNode const* node) {
-    for (xvector<DGNode const*>* nodes : m_notified) {
-      std::replace(nodes->begin(), nodes->end(), node, static_cast<DGNode const*>(nullptr));
-    }
-    if (!m_isEvaluating) return;
-    m_again.erase(node);
-    m_failed.erase(node);
-    m_unwound.erase(node);
-    m_targets.erase(
-        std::remove_if(m_targets.begin(), m_targets.end(), [=](Target const& t) { return t.m_node == node; }),
-        m_targets.end());
-    for (Calculation* at = m_calculation; at; at = at->m_outer) at->m_inputs.erase(node);
-    // What a calculation had made and wanted to read: the calculation itself must begin further out.
-    if (m_deep == node) m_deep = m_calculation ? m_calculation->m_node : nullptr;
-  }
+  void OnDestroy(DGNode const* node);
 
   Calculation* m_calculation = nullptr;  // the innermost
   EvictionQueue m_queues[8];

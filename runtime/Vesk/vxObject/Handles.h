@@ -136,4 +136,10 @@ ptr<I> QueryInterface(ptr<J> const& p) {
   return ptr<I>(object.QueryInterface(GetReflectedInterface<std::remove_const_t<I>>()));
 }
 
+namespace unqualified {
+using vesk::cref;
+using vesk::pref;
+using vesk::ptr;
+}  // namespace unqualified
+
 }  // namespace vesk

@@ -23,7 +23,8 @@
 // not written. What is read is changed field by field: after an error the fields before it have their new values.
 //
 // A reader trusts nothing: the text is checked whole before anything is changed, the limits hold for it, and objects
-// are made only of registered classes that the reference may lead to and that `m_allow` admits.
+// are made only of registered classes that the reference may lead to and that `m_allow` admits, values of an
+// openvariant of types that `m_allowType` (and for a class `m_allow`) admits.
 
 @import "Vesk/vxObject/Access.h"
 
@@ -49,7 +50,8 @@ struct JsonLimits {
   std::size_t m_memory = std::size_t(256) << 20;  // of the elements and objects that it makes
   int m_depth = kJsonDepth;
   bool m_ignoreUnknown = false;                        // members that no field has
-  std::function<bool(ReflectedClass const&)> m_allow;  // classes that objects may be made of; empty: all registered
+  std::function<bool(ReflectedClass const&)> m_allow;  // classes that may be made; empty: all registered
+  std::function<bool(xstring const&)> m_allowType;     // types of values of an openvariant; the same
 };
 
 xstring ToJson(Value const& value, JsonStyle const& style = JsonStyle());

@@ -36,44 +36,17 @@ struct BaseMixin : public B {
 // safe in any thread, but Collect wants that no other thread changes objects meanwhile.
 class ObjectHeap : private IObjectVisitor {
  public:
-  static ObjectHeap& Get() {
-    static ObjectHeap* const heap = new ObjectHeap;  // outlives every static object
-    return *heap;
-  }
+  static ObjectHeap& Get();
 
   // `size`: the bytes of the object. A pointer into it, such as one to a base, reaches it.
-  void Add(ptr<IObject> const& object, std::size_t size) {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    m_objects[Address(object.Object())] = {object, size, ++m_lastSerial};
-  }
+  void Add(ptr<IObject> const& object, std::size_t size);
   // Forgets an object that is being destroyed. Any other address is none of its business.
-  void Remove(void const* object) {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    m_objects.erase(Address(object));
-  }
-  ssize_t Count() const {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    return static_cast<ssize_t>(m_objects.size());
-  }
+  void Remove(void const* object);
+  ssize_t Count() const;
 
   // Destroys the objects that cannot be reached from the roots, in the order in which they were made. Answers how
   // many. A destructor may make objects, and may destroy others that are about to be: they are destroyed once.
-  ssize_t Collect(xvector<ptr<IObject>> const& roots) {
-    m_reached.clear();
-    for (ptr<IObject> const& root : roots) VisitObject(root);
-    while (!m_pending.empty()) {
-      const ptr<IObject> object = m_pending.back();
-      m_pending.pop_back();
-      object->VisitObjects(*this);
-    }
-    ssize_t count = 0;
-    for (Made const& made : Unreached()) {
-      if (!Take(made)) continue;
-      made.m_object->DestroyObject();
-      ++count;
-    }
-    return count;
-  }
+  ssize_t Collect(xvector<ptr<IObject>> const& roots);
 
  private:
   typedef std::uintptr_t Number;
@@ -85,36 +58,12 @@ class ObjectHeap : private IObjectVisitor {
 
   static Number Address(void const* object) { return reinterpret_cast<Number>(object); }
 
-  void VisitObject(ptr<IObject> const& object) override {
-    if (!object) return;
-    const ptr<IObject> whole = WholeObject(object);
-    if (m_reached.insert(whole.Object()).second) m_pending.push_back(whole);
-  }
+  void VisitObject(ptr<IObject> const& object) override;
   // The object of this heap that holds the other one, as it was made.
-  ptr<IObject> WholeObject(ptr<IObject> const& object) const {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    auto at = m_objects.upper_bound(Address(object.Object()));
-    if (at == m_objects.begin()) return object;
-    --at;
-    return Address(object.Object()) - at->first < at->second.m_size ? at->second.m_object : object;
-  }
-  xvector<Made> Unreached() const {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    xvector<Made> unreached;
-    for (auto const& [address, made] : m_objects) {
-      if (m_reached.count(made.m_object.Object()) == 0) unreached.push_back(made);
-    }
-    std::sort(unreached.begin(), unreached.end(), [](Made const& a, Made const& b) { return a.m_serial < b.m_serial; });
-    return unreached;
-  }
+  ptr<IObject> WholeObject(ptr<IObject> const& object) const;
+  xvector<Made> Unreached() const;
   // Whether the object is still there, and no other one stands in its place.
-  bool Take(Made const& made) {
-    std::lock_guard<std::mutex> lock(m_mutex);
-    const auto at = m_objects.find(Address(made.m_object.Object()));
-    if (at == m_objects.end() || at->second.m_serial != made.m_serial) return false;
-    m_objects.erase(at);
-    return true;
-  }
+  bool Take(Made const& made);
 
   mutable std::mutex m_mutex;
   std::map<Number, Made> m_objects;

@@ -26,34 +26,19 @@ struct ModelChange {
   ConstStringZ m_name;  // null with a path
 
   // "lines[2].amount", or the name.
-  xstring PathText() const {
-    return m_name || !m_class ? xstring(m_name ? m_name : "") : vesk::PathText(*m_class, m_path);
-  }
+  xstring PathText() const;
 };
 
 // Calls a function with each change of its thread while it lives. A hook may make others and destroy any.
 class ModelHook {
  public:
   typedef std::function<void(ModelChange const&)> Function;
-  explicit ModelHook(Function function) : m_function(std::move(function)), m_hooks(Hooks::Get()) {
-    m_hooks.m_list.push_back(this);
-    m_hooks.Use();
-  }
-  ~ModelHook() {
-    m_hooks.m_list.remove(this);
-    m_hooks.Release();
-  }
+  explicit ModelHook(Function function);
+  ~ModelHook();
   ModelHook(ModelHook const&) = delete;
   void operator=(ModelHook const&) = delete;
 
-  static void Notify(ModelChange const& change) {
-    std::list<ModelHook*> const& hooks = Hooks::Get().m_list;
-    for (ModelHook* hook : std::list<ModelHook*>(hooks)) {
-      if (std::find(hooks.begin(), hooks.end(), hook) == hooks.end()) continue;
-      const Function function = hook->m_function;
-      function(change);
-    }
-  }
+  static void Notify(ModelChange const& change);
   static bool Any() {
     Hooks const* hooks = Hooks::Peek();
     return hooks && !hooks->m_list.empty();
@@ -191,44 +176,19 @@ bool genop_DeleteFromMSet(T* object, Path const& path, E& field, K const& key) {
 
 // --- A project at run time
 
-inline void WriteRsn(XTarget const& target, Archive& ar) { SerialiseVariableLengthUint(ar, target.m_rsn); }
-
+void WriteRsn(XTarget const& target, Archive& ar);
 // The release of an archive is the archive's own, for each project that wrote a part of it.
-inline void ReadRsn(XTarget const& target, InputArchive& ar) {
-  const RSN release = ReadCompact(ar);
-  if (release > target.m_rsn) {
-    throw ArchiveError(vxMakeString("archive of release " << release << ", this is release " << target.m_rsn));
-  }
-  auto at = ar.m_releases.begin();
-  while (at != ar.m_releases.end() && at->first != &target) ++at;
-  if (at == ar.m_releases.end()) at = ar.m_releases.insert(at, {&target, release});
-  at->second = release;
-  // A class that is not read by `>>`: its model asks next.
-  if (t_reading.m_archive != &ar) {
-    t_reading.m_target = &target;
-    t_reading.m_release = release;
-  }
-}
-
+void ReadRsn(XTarget const& target, InputArchive& ar);
 // The release that a model is to be read as: that of the archive being read, else the current one.
-inline RSN ReleaseBeingRead(XTarget const& target) {
-  if (std::exchange(t_reading.m_target, nullptr) == &target) return t_reading.m_release;
-  if (!t_reading.m_archive) return target.m_rsn;
-  for (auto const& [project, release] : t_reading.m_archive->m_releases) {
-    if (project == &target) return release;
-  }
-  return target.m_rsn;
-}
+RSN ReleaseBeingRead(XTarget const& target);
 
 }  // namespace vesk
 
 // In one source of each project: X is the project's folder with `_` for each `/`, RELEASE the release number that its
 // models write. Archives of classes begin with it; models are read as of the release that their archive names. The
 // project's Unregister_Project_ function takes its records out of the registry.
-@def vxDefineTarget(X, RELEASE) =
-{
-    vxDefineTargetFunctions(X, RELEASE)
-    $uninit { vxUnregisterTarget(X); }
+@def vxDefineTarget(X, RELEASE) = {vxDefineTargetFunctions(X, RELEASE) $uninit{vxUnregisterTarget(X);
+}
 }
 #define vxUnregisterTarget(X) ::vesk::UnregisterTarget(::vesk::X##_GetXTarget())
 #define vxDefineTargetFunctions(X, RELEASE)                                        \

@@ -6,10 +6,6 @@
 #include <map>
 #include <typeindex>
 
-#if defined(__linux__)
-#include <pthread.h>
-#endif
-
 namespace vesk {
 
 struct WrittenObject {
@@ -23,11 +19,7 @@ struct WrittenObjects {
   typedef std::pair<void const*, std::type_index> Key;
 
   // Answers the number, and whether the object is new.
-  std::pair<std::size_t, bool> Insert(WrittenObject const& object, std::type_info const& type) {
-    const auto [at, isNew] = m_numbers.insert({Key(object.m_object, type), m_list.size() + 1});
-    if (isNew) m_list.push_back(object);
-    return {at->second, isNew};
-  }
+  std::pair<std::size_t, bool> Insert(WrittenObject const& object, std::type_info const& type);
 
   xvector<WrittenObject> m_list;
   std::map<Key, std::size_t> m_numbers;
@@ -55,42 +47,17 @@ struct ReferenceCleaner : IPrefVisitor {
 struct ReadObjects {
   // Destroys the objects from this position on. Their references are cleared ahead of it, so that a destructor that
   // follows one meets nothing that is gone.
-  void Destroy(std::size_t first = 0) {
-    for (std::size_t i = first; i < m_list.size(); ++i) {
-      if (m_list[i].m_self) m_list[i].m_forget(m_list[i]);
-    }
-    while (m_list.size() > first) {
-      const ReadObject object = m_list.back();
-      m_list.pop_back();
-      if (object.m_self) object.m_destroy(object);
-    }
-  }
+  void Destroy(std::size_t first = 0);
 
   xvector<ReadObject> m_list;
-  std::size_t m_next = 0;                              // the first object whose content may have to be read
-  bool m_isReading = false;                            // who set it reads the contents
-  std::function<bool(ReflectedClass const&)> m_allow;  // asked before an object is made; empty: all that fit
+  std::size_t m_next = 0;    // the first object whose content may have to be read
+  bool m_isReading = false;  // who set it reads the contents
+  // Asked before what the archive names is made; empty: all that fit.
+  std::function<bool(ReflectedClass const&)> m_allow;    // of an object, or of an openvariant's value that has one
+  std::function<bool(xstring const& type)> m_allowType;  // of any value of an openvariant
 };
 
 // How many bytes the calling thread's stack can still grow by, or a careful guess where the system does not say.
-inline std::size_t StackLeft() {
-  char const* here = static_cast<char const*>(__builtin_frame_address(0));
-#if defined(__linux__)
-  static thread_local char const* s_end = nullptr;
-  if (!s_end) {
-    pthread_attr_t attributes;
-    void* end = nullptr;
-    std::size_t size;
-    if (pthread_getattr_np(pthread_self(), &attributes) == 0) {
-      pthread_attr_getstack(&attributes, &end, &size);
-      pthread_attr_destroy(&attributes);
-    }
-    s_end = static_cast<char const*>(end);
-  }
-#else
-  static thread_local char const* s_end = here - 256 * 1024;
-#endif
-  return here > s_end ? static_cast<std::size_t>(here - s_end) : 0;
-}
+std::size_t StackLeft();
 
 }  // namespace vesk

@@ -61,6 +61,9 @@ class openvariant {
     ar >> name;
     openvariant read;
     if (!name.empty()) {
+      if (!IsTypeAllowed(ar.m_objects.m_allow, ar.m_objects.m_allowType, name)) {
+        throw ArchiveError("type is not allowed: " + name);
+      }
       read = DefaultOf(OpsOf(name));
       read.m_ops->m_deserialise(ar, read.m_value, 0, 1);
     }
@@ -131,5 +134,9 @@ class openvariant {
   TypeOps const* m_ops = nullptr;
   void* m_value = nullptr;
 };
+
+namespace unqualified {
+using vesk::openvariant;
+}  // namespace unqualified
 
 }  // namespace vesk

@@ -26,35 +26,13 @@ class FlagScope {
   bool& m_flag;
 };
 
-inline void WritePersistable(Archive& ar, WrittenObject const& object) {
-  ptr<IPersistable>(object.m_persistable)->Serialise(ar);
-}
+void WritePersistable(Archive& ar, WrittenObject const& object);
 
 // The contents of the objects that were mentioned, unless someone further out is about to write them.
-inline void WriteContents(Archive& ar) {
-  WrittenObjects& objects = ar.m_objects;
-  if (objects.m_isWriting) return;
-  FlagScope scope(objects.m_isWriting);
-  while (objects.m_next < objects.m_list.size()) {
-    const WrittenObject object = objects.m_list[objects.m_next++];
-    object.m_write(ar, object);
-  }
-}
+void WriteContents(Archive& ar);
 
 // Writes the number. Answers whether it was the first mention.
-inline bool WriteMention(Archive& ar, WrittenObject const& object, std::type_info const& type) {
-  if (ar.m_writesAddresses) {
-    ar.Write(&object.m_object, sizeof(object.m_object));
-    return false;
-  }
-  if (!object.m_object) {
-    SerialiseVariableLengthUint(ar, 0);
-    return false;
-  }
-  const auto [number, isNew] = ar.m_objects.Insert(object, type);
-  SerialiseVariableLengthUint(ar, isNew ? number + 1 : number);
-  return isNew;
-}
+bool WriteMention(Archive& ar, WrittenObject const& object, std::type_info const& type);
 
 template <typename I>
 void WriteObjectMention(Archive& ar, ptr<I> const& object) {
@@ -91,28 +69,11 @@ void Serialise(Archive& ar, cref<C> const& reference) {
 
 enum class EMention { Null, Known, New, NewWithContent };
 
-inline EMention ReadMention(InputArchive& ar, std::size_t& number) {
-  DeserialiseVariableLengthUint(ar, number);
-  const std::size_t known = ar.m_objects.m_list.size();
-  if (number == 0) return EMention::Null;
-  if (number <= known) return EMention::Known;
-  if (number > known + 2) throw ArchiveError("reference to an object that is not in the archive");
-  if (known >= ar.m_limits.m_objects) throw ArchiveError("too many objects in an archive");
-  const bool hasContent = number == known + 1;
-  number = known + 1;
-  return hasContent ? EMention::NewWithContent : EMention::New;
-}
+// What stands next; `number` is the object's, that of a new one included.
+EMention ReadMention(InputArchive& ar, std::size_t& number);
 
-// Where contents stand within each other the stack grows with them.
-constexpr std::size_t LeastStackForContent = 128 * 1024;
-
-inline void ReadContent(InputArchive& ar, std::size_t position) {
-  if (ar.m_objects.m_list[position].m_isRead) return;
-  if (StackLeft() < LeastStackForContent) throw ArchiveError("objects nested too deeply in an archive");
-  ar.m_objects.m_list[position].m_isRead = true;
-  const ReadObject object = ar.m_objects.m_list[position];
-  object.m_read(ar, object);
-}
+// The content of the object at this position, unless it was read.
+void ReadContent(InputArchive& ar, std::size_t position);
 
 // Reads a number and what must follow it. Make: ReadObject(), of an object that the archive begins. Answers its
 // position, -1 for null.
@@ -143,10 +104,7 @@ ssize_t ReadReference(InputArchive& ar, Make make) {
   return position;
 }
 
-inline bool ListsInterface(ReflectedClass const& record, ConstStringZ name) {
-  ConstStringZ const* end = record.m_interfaces + record.m_numBaseInterfaces + record.m_numInterfaces;
-  return std::any_of(record.m_interfaces, end, [name](ConstStringZ other) { return std::strcmp(name, other) == 0; });
-}
+bool ListsInterface(ReflectedClass const& record, ConstStringZ name);
 
 // Makes an object of the class that the archive names. `fits`: whether a class is what the reference asks for.
 template <typename Fits>
@@ -236,12 +194,7 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
 // written without it can be read as well.
 constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 1};
 
-inline void ReadObjectMark(InputArchive& ar) {
-  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
-  octet_t const* mark = ar.Take(sizeof(ObjectMark));
-  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
-  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
-}
+void ReadObjectMark(InputArchive& ar);
 
 // An object with all that it refers to: classes and contents.
 template <typename I>

@@ -64,11 +64,11 @@ constexpr NullInterface null = {};
 
 }  // namespace vesk
 
-// Generated text spells scalar types without a name space in some places, and so may the signatures of `$` members. A
-// header that has names like these in the global name space can stand beside it: an ambiguous name must then be
-// qualified where it is used.
+// Generated text spells scalar types without a name space in some places. The signatures of `$` members may spell all
+// types so: they are copied as they stand, and the type grammar needs no name space. A header that has names like these
+// in the global name space can stand beside it: an ambiguous name must then be qualified where it is used.
 namespace vesk {
-namespace scalars {
+namespace unqualified {
 using vesk::char16;
 using vesk::char8;
 using vesk::float32;
@@ -83,9 +83,9 @@ using vesk::uint16;
 using vesk::uint32;
 using vesk::uint64;
 using vesk::uint8;
-}  // namespace scalars
+}  // namespace unqualified
 }  // namespace vesk
-using namespace vesk::scalars;
+using namespace vesk::unqualified;
 
 #if defined(_LIBCPP_VERSION) && !defined(_LIBCPP_ENABLE_CXX17_REMOVED_AUTO_PTR)
 // What [copy] parameters arrive in. This library has taken it out.

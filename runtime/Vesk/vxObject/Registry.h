@@ -20,155 +20,49 @@ struct XTarget {
 
 enum NSE { NSE_OK, NSE_ALREADY_DEFINED };
 
-template <typename R>
-struct RegisteredRecord {
-  R const* m_record;
-  XTarget* m_target;
-};
-
-// By name: the record in use in front, behind it the copies of it that other modules of the process have.
-template <typename R>
-std::map<std::string, std::vector<RegisteredRecord<R>>>& RecordTable() {
-  static auto* const table = new std::map<std::string, std::vector<RegisteredRecord<R>>>;  // outlives static objects
-  return *table;
-}
-
-// The same record may be registered again, and so may a copy of it; another one of its name is refused.
-template <typename R>
-NSE RegisterRecord(R const* record, XTarget* target) {
-  std::vector<RegisteredRecord<R>>& records = RecordTable<R>()[record->m_name];
-  for (RegisteredRecord<R> const& registered : records) {
-    if (registered.m_record == record) return NSE_OK;
-  }
-  if (!records.empty() && LayoutText(*records.front().m_record) != LayoutText(*record)) return NSE_ALREADY_DEFINED;
-  records.push_back({record, target});
-  return NSE_OK;
-}
-
-inline NSE RegisterReflectedClass(ReflectedClass const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedInterface(ReflectedInterface const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedEnum(ReflectedEnum const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedVariant(ReflectedVariant const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedFunctor(ReflectedFunctor const* r, XTarget* t) { return RegisterRecord(r, t); }
-inline NSE RegisterReflectedGlobalFunction(ReflectedGlobalFunction const* r, XTarget* t) {
-  return RegisterRecord(r, t);
-}
-inline NSE RegisterReflectedGlobalVariable(ReflectedGlobalVariable const* r, XTarget* t) {
-  return RegisterRecord(r, t);
-}
-inline NSE RegisterReflectedTypedef(ReflectedTypedef const* r, XTarget* t) { return RegisterRecord(r, t); }
+// The same record may be registered again, and so may a copy of it that another module of the process has; another one
+// of its name is refused.
+NSE RegisterReflectedClass(ReflectedClass const* record, XTarget* target);
+NSE RegisterReflectedInterface(ReflectedInterface const* record, XTarget* target);
+NSE RegisterReflectedEnum(ReflectedEnum const* record, XTarget* target);
+NSE RegisterReflectedVariant(ReflectedVariant const* record, XTarget* target);
+NSE RegisterReflectedFunctor(ReflectedFunctor const* record, XTarget* target);
+NSE RegisterReflectedGlobalFunction(ReflectedGlobalFunction const* record, XTarget* target);
+NSE RegisterReflectedGlobalVariable(ReflectedGlobalVariable const* record, XTarget* target);
+NSE RegisterReflectedTypedef(ReflectedTypedef const* record, XTarget* target);
 
 // Find<ReflectedClass>("a::Name"), null when there is none. All<ReflectedClass>() lists them.
 template <typename R>
-R const* Find(std::string const& name) {
-  const auto at = RecordTable<R>().find(name);
-  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_record;
-}
-
+R const* Find(std::string const& name);
 template <typename R>
-xvector<R const*> All() {
-  xvector<R const*> records;
-  for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.front().m_record);
-  return records;
-}
-
+xvector<R const*> All();
+// The project that registered the record; null for none.
 template <typename R>
-XTarget* TargetOf(R const& record) {
-  const auto at = RecordTable<R>().find(record.m_name);
-  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_target;
-}
+XTarget* TargetOf(R const& record);
 
 // --- Types
 
-inline std::map<xstring, TypeOps const*>& TypeOpsTable() {
-  static auto* const table = new std::map<xstring, TypeOps const*>{
-      {"bool", &MakeTypeOps<bool>()},       {"int8", &MakeTypeOps<int8>()},        {"int16", &MakeTypeOps<int16>()},
-      {"int32", &MakeTypeOps<int32>()},     {"int64", &MakeTypeOps<int64>()},      {"int128", &MakeTypeOps<int128>()},
-      {"uint8", &MakeTypeOps<uint8>()},     {"uint16", &MakeTypeOps<uint16>()},    {"uint32", &MakeTypeOps<uint32>()},
-      {"uint64", &MakeTypeOps<uint64>()},   {"uint128", &MakeTypeOps<uint128>()},  {"float32", &MakeTypeOps<float32>()},
-      {"float64", &MakeTypeOps<float64>()}, {"char8", &MakeTypeOps<char8>()},      {"char16", &MakeTypeOps<char16>()},
-      {"string8", &MakeTypeOps<string8>()}, {"string16", &MakeTypeOps<string16>()}};
-  return *table;
-}
+// By their text. Those of scalars and strings are always there.
+std::map<xstring, TypeOps const*>& TypeOpsTable();
 
 // The first table of a type stays.
-inline bool RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops) {
-  TypeOpsTable().insert({type.m_text, ops});
-  return true;
-}
+bool RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops);
 
 // Null when nobody registered the type. Decorators, metadata and typedefs are looked through.
-inline TypeOps const* FindTypeOps(ReflectedType const& type) {
-  if (type.m_code >= RC_VOLATILE && type.m_code <= RC_OFFSETTABLE) return FindTypeOps(type.m_inner.front());
-  if (type.m_code == RC_CLASS) {
-    ReflectedClass const* record = Find<ReflectedClass>(type.m_name);
-    return record ? &record->m_ops : nullptr;
-  }
-  if (type.m_code == RC_VARIANT) {
-    ReflectedVariant const* record = Find<ReflectedVariant>(type.m_name);
-    return record ? &record->m_ops : nullptr;
-  }
-  if (type.m_code == RC_ENUM) return &MakeTypeOps<int32>();
-  if (type.m_code == RC_TYPEDEF) {
-    ReflectedTypedef const* record = Find<ReflectedTypedef>(type.m_name);
-    return record ? FindTypeOps(DecodeType({record->m_type, record->m_strings})) : nullptr;
-  }
-  ReflectedType plain = type;
-  plain.m_metadata.clear();
-  const auto at = TypeOpsTable().find(vxMakeString(plain));
-  return at == TypeOpsTable().end() ? nullptr : at->second;
-}
+TypeOps const* FindTypeOps(ReflectedType const& type);
+TypeOps const* FindTypeOps(ReflectionByteCode code);
 
-inline TypeOps const* FindTypeOps(ReflectionByteCode code) { return FindTypeOps(DecodeType(code)); }
+// Whether a value may be made of the type that an archive or a text names: as a class, and as a type.
+bool IsTypeAllowed(std::function<bool(ReflectedClass const&)> const& allow,
+                   std::function<bool(xstring const&)> const& allowType, xstring const& name);
 
 // Prints a value known only by its type: an enumeration by its label, the items of containers one by one, "?" when
 // the type is not registered.
-inline void PrintValue(xostream& os, ReflectedType const& type, void const* value) {
-  if (type.m_code == RC_ENUM) {
-    PrintEnum(os, Find<ReflectedEnum>(type.m_name), *static_cast<int32 const*>(value));
-    return;
-  }
-  TypeOps const* ops = FindTypeOps(type);
-  if (ops && ops->m_print) {
-    ops->m_print(os, value);
-  } else {
-    os << '?';
-  }
-}
+void PrintValue(xostream& os, ReflectedType const& type, void const* value);
 
 // --- Unloading
 
-template <typename R>
-void UnregisterRecords(XTarget const* target) {
-  auto& table = RecordTable<R>();
-  for (auto at = table.begin(); at != table.end();) {
-    std::vector<RegisteredRecord<R>>& records = at->second;
-    records.erase(std::remove_if(records.begin(), records.end(),
-                                 [=](RegisteredRecord<R> const& record) { return record.m_target == target; }),
-                  records.end());
-    at = records.empty() ? table.erase(at) : std::next(at);
-  }
-}
-
 // Takes all records of a project out of the registry. What uses one of them must be gone.
-inline void UnregisterTarget(XTarget const* target) {
-  UnregisterRecords<ReflectedClass>(target);
-  UnregisterRecords<ReflectedInterface>(target);
-  UnregisterRecords<ReflectedEnum>(target);
-  UnregisterRecords<ReflectedVariant>(target);
-  UnregisterRecords<ReflectedFunctor>(target);
-  UnregisterRecords<ReflectedGlobalFunction>(target);
-  UnregisterRecords<ReflectedGlobalVariable>(target);
-  UnregisterRecords<ReflectedTypedef>(target);
-}
-
-inline XTarget::~XTarget() {
-  if (IsProcessEnding(this)) return;
-  UnregisterTarget(this);
-  auto& table = TypeOpsTable();
-  for (auto at = table.begin(); at != table.end();) {
-    at = ModuleOf(at->second) == ModuleOf(this) ? table.erase(at) : std::next(at);
-  }
-}
+void UnregisterTarget(XTarget const* target);
 
 }  // namespace vesk

@@ -12,8 +12,6 @@
 @import "Vesk/vxObject/Channel.h"
 @import "Vesk/vxObject/Persist.h"
 
-#include <unordered_map>
-
 namespace vesk {
 
 // What the first byte behind an answer's number says.
@@ -21,12 +19,40 @@ enum EAnswer { AN_VALUES, AN_ERROR };
 
 // --- Client
 
+// The results of an `ipc` call: generated text takes them out of an Archive.
+template <typename T>
+Archive& operator>>(Archive& ar, T& value) {
+  if (!ar.m_answer) throw ArchiveError("archive is not for reading");
+  *ar.m_answer >> value;
+  return ar;
+}
+
+// Reads the values of an answer to where their addresses tell.
+class ReadResults {
+ public:
+  typedef void (*FromInput)(InputArchive&, void**);
+  typedef void (*FromArchive)(Archive&, void**);
+  ReadResults() {}
+  ReadResults(FromInput function) : m_fromInput(function) {}
+  ReadResults(FromArchive function) : m_fromArchive(function) {}
+
+  void operator()(InputArchive& answer, void** outParams) const {
+    if (m_fromInput) return m_fromInput(answer, outParams);
+    Archive ar;
+    ar.m_answer = &answer;
+    m_fromArchive(ar, outParams);
+  }
+
+ private:
+  FromInput m_fromInput = nullptr;
+  FromArchive m_fromArchive = nullptr;
+};
+
 // Where the values of an answer go.
 struct PendingResponse {
-  typedef void (*Function)(InputArchive&, void**);
   virtual ~PendingResponse() {}
   virtual void** OutParams() = 0;
-  Function m_fn = nullptr;
+  ReadResults m_fn;
 };
 
 template <int N>
@@ -38,8 +64,8 @@ struct QueuedResponse : PendingResponse {
 class ClientConnection {
  public:
   // `serve`: lets the other side work while a call waits for its answer; empty where it works by itself.
-  ClientConnection(Channel& channel, std::function<void()> serve = nullptr)
-      : m_channel(channel), m_serve(std::move(serve)) {}
+  ClientConnection(Channel& channel, std::function<void()> serve = nullptr);
+  ~ClientConnection();
 
   // How long a call waits for its answer in a channel that can wait: 30 seconds unless told otherwise.
   void SetTimeout(std::chrono::milliseconds timeout) { m_timeout = timeout; }
@@ -47,98 +73,39 @@ class ClientConnection {
 
   // The number for the next call that waits.
   uint32 NextAnswer() { return ++m_lastAnswer != 0 ? m_lastAnswer : ++m_lastAnswer; }
-  void Send(Archive const& message) {
-    CheckMessageSize(message.m_bytes.size(), m_messageLimit);
-    m_channel.Send(message.m_bytes);
-  }
+  void Send(Archive const& message);
   // Sends a call and waits for its answer, whose values `response` takes. Whatever way the call ends, no later answer
   // finds the response.
-  void Call(Archive const& message, uint32 answer, PendingResponse& response) {
-    Pending pending(*this, answer, response);
-    Send(message);
-    if (m_serve) m_serve();
-    const auto end = std::chrono::steady_clock::now() + m_timeout;
-    xvector<octet_t> bytes;
-    while (!pending.m_isDone) {
-      const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
-      if (!m_channel.ReceiveWithin(bytes, std::max(left, std::chrono::milliseconds(0)))) {
-        if (!m_channel.IsOpen()) throw ChannelClosed("the other side is gone");
-        throw RemoteTimeout("remote call without an answer");
-      }
-      Dispatch(bytes);
-    }
-    if (!pending.m_error.empty()) throw RemoteError(pending.m_error);
-  }
+  void Call(Archive const& message, uint32 answer, PendingResponse& response);
 
  private:
-  // A call under way.
-  struct Pending {
-    Pending(ClientConnection& connection, uint32 answer, PendingResponse& response)
-        : m_connection(connection), m_answer(answer), m_response(response) {
-      connection.m_pending[answer] = this;
-    }
-    ~Pending() { m_connection.m_pending.erase(m_answer); }
-    Pending(Pending const&) = delete;
-    void operator=(Pending const&) = delete;
+  struct Pending;  // a call under way
 
-    ClientConnection& m_connection;
-    uint32 m_answer;
-    PendingResponse& m_response;
-    bool m_isDone = false;
-    std::string m_error;
-  };
-
-  // An answer that nobody waits for any more is dropped.
-  void Dispatch(xvector<octet_t> const& message) {
-    CheckMessageSize(message.size(), m_messageLimit);
-    if (message.empty()) throw RemoteError("empty message");
-    InputArchive ar(message);
-    uint32 answer;
-    DeserialiseVariableLengthUint(ar, answer);
-    const auto at = m_pending.find(answer);
-    if (at == m_pending.end()) return;
-    Pending& pending = *at->second;
-    pending.m_isDone = true;
-    try {
-      ReadAnswer(ar, pending);
-    } catch (std::exception const& error) {
-      pending.m_error = std::string("bad answer: ") + error.what();
-    }
-  }
-  static void ReadAnswer(InputArchive& ar, Pending& pending) {
-    octet_t kind;
-    ar.Read(&kind, 1);
-    if (kind == AN_VALUES) {
-      pending.m_response.m_fn(ar, pending.m_response.OutParams());
-    } else {
-      xstring error;
-      ar >> error;
-      pending.m_error = error.empty() ? "remote call failed" : error;
-    }
-    if (ar.Remaining() > 0) throw RemoteError("bytes behind the values");
-  }
+  void Dispatch(xvector<octet_t> const& message);
+  static void ReadAnswer(InputArchive& ar, Pending& pending);
 
   Channel& m_channel;
   std::function<void()> m_serve;
   std::chrono::milliseconds m_timeout = std::chrono::seconds(30);
   std::size_t m_messageLimit = kMessageLimit;
   uint32 m_lastAnswer = 0;
-  std::unordered_map<uint32, Pending*> m_pending;
+  xvector<Pending*> m_pending;  // one within the other
 };
 
 template <typename I>
 using InterfaceRecordExpression =
     decltype(static_cast<ReflectedInterface const&>(_GetReflected(std::declval<I const*>())));
 
-// Stands for an object on the other side. It offers what IObject asks for, so that an interface that derives from it
-// can be remote; its methods reach the other side, those of IObject do not.
+// Stands for an object on the other side. It offers what IObject and IPersistable ask for, so that an interface that
+// derives from one of them can be remote; its methods reach the other side, those of the two do not. It has no class,
+// so that archives refuse it.
 class Stub {
  public:
   template <typename I>
   Stub(ptr<I> self, ssize_t) : m_self(self.Any()) {
     if constexpr (Detects<InterfaceRecordExpression, I>) m_interface = &GetReflectedInterface<I>();
   }
-  virtual ~Stub() {}
+  virtual ~Stub();
 
   void Connect(ClientConnection& connection, uint32 object) {
     m_connection = &connection;
@@ -154,29 +121,14 @@ class Stub {
   void VisitPrefs(IPrefVisitor&) const {}
   void EvictDgsNodes() const {}
   void DestroyObject() { delete this; }
+  void Serialise(Archive&) const { throw ArchiveError("a remote object cannot be archived"); }
+  void Deserialise(InputArchive&) { throw ArchiveError("a remote object cannot be archived"); }
 
  protected:
   // The response is the stub's from here on.
-  Archive& StubBegin(ssize_t method, PendingResponse* response) const {
-    m_response.reset(response);
-    if (!m_connection) throw RemoteError("stub without a connection");
-    m_message = Archive();
-    m_answer = response ? m_connection->NextAnswer() : 0;
-    SerialiseVariableLengthUint(m_message, m_object);
-    SerialiseVariableLengthUint(m_message, method);
-    SerialiseVariableLengthUint(m_message, m_answer);
-    return m_message;
-  }
+  Archive& StubBegin(ssize_t method, PendingResponse* response) const;
   // A call may lead to another one through this stub while it waits.
-  void StubEnd() const {
-    const Archive message = std::move(m_message);
-    const std::unique_ptr<PendingResponse> response = std::move(m_response);
-    if (response) {
-      m_connection->Call(message, m_answer, *response);
-    } else {
-      m_connection->Send(message);
-    }
-  }
+  void StubEnd() const;
 
  private:
   AnyInterface m_self;
@@ -197,22 +149,14 @@ typedef ThunkFn ScionThunkFn;
 // Unmarshals the calls of one object.
 class Dispatcher {
  public:
-  Dispatcher(ThunkFn const* thunks, ssize_t count) : m_delegate{{this}, nullptr}, m_thunks(thunks), m_count(count) {}
-  virtual ~Dispatcher() {}
+  Dispatcher(ThunkFn const* thunks, ssize_t count);
+  virtual ~Dispatcher();
   Dispatcher(Dispatcher const&) = delete;
   void operator=(Dispatcher const&) = delete;
 
-  void SetDelegate(AnyInterface delegate) {
-    m_object = delegate.m_self;
-    m_delegate.m_table = delegate.m_table;
-  }
+  virtual void SetDelegate(AnyInterface delegate) = 0;
   // The values that go back. A call may lead to another one of the same object.
-  Archive Call(void* self, ssize_t method, InputArchive arguments) {
-    if (method < 0 || method >= m_count) throw RemoteError("no such remote method");
-    const Scope scope(*this, std::move(arguments));
-    m_thunks[method](self);
-    return std::move(m_results);
-  }
+  Archive Call(void* self, ssize_t method, InputArchive arguments);
 
  protected:
   // Reads the arguments, which stay with the dispatcher.
@@ -228,12 +172,35 @@ class Dispatcher {
    private:
     InputArchive& m_archive;
   };
+
+  Arguments Pop() { return Arguments(m_arguments); }
+  Archive& Push() { return m_results; }
+  void CheckArgumentsRead() const;
+
+ private:
+  struct Scope;
+
+  ThunkFn const* m_thunks;
+  ssize_t m_count;
+  InputArchive m_arguments;
+  Archive m_results;
+};
+
+class Skeleton : public Dispatcher {
+ public:
+  Skeleton(ThunkFn const* thunks, ssize_t count) : Dispatcher(thunks, count), m_delegate{{this}, nullptr} {}
+  void SetDelegate(AnyInterface delegate) override {
+    m_object = delegate.m_self;
+    m_delegate.m_table = delegate.m_table;
+  }
+
+ private:
   // The object. A thunk asks for it when it has read the arguments, just before it calls: nothing may be left then.
   struct Object {
-    Dispatcher* m_dispatcher;
+    Skeleton* m_skeleton;
     operator void*() const {
-      if (m_dispatcher->m_arguments.Remaining() > 0) throw RemoteError("bytes behind the arguments");
-      return m_dispatcher->m_object;
+      m_skeleton->CheckArgumentsRead();
+      return m_skeleton->m_object;
     }
   };
   struct Delegate {
@@ -241,44 +208,22 @@ class Dispatcher {
     void const* m_table;
   };
 
-  Arguments Pop() { return Arguments(m_arguments); }
-  Archive& Push() { return m_results; }
+ protected:
   Delegate m_delegate;
 
  private:
-  // The call that is carried out; the one around it goes on with what is its own.
-  struct Scope {
-    Scope(Dispatcher& dispatcher, InputArchive arguments)
-        : m_dispatcher(dispatcher),
-          m_arguments(std::exchange(dispatcher.m_arguments, std::move(arguments))),
-          m_results(std::exchange(dispatcher.m_results, Archive())) {}
-    ~Scope() {
-      m_dispatcher.m_arguments = std::move(m_arguments);
-      m_dispatcher.m_results = std::move(m_results);
-    }
-    Scope(Scope const&) = delete;
-    void operator=(Scope const&) = delete;
-
-    Dispatcher& m_dispatcher;
-    InputArchive m_arguments;
-    Archive m_results;
-  };
-
-  ThunkFn const* m_thunks;
-  ssize_t m_count;
   void* m_object = nullptr;
-  InputArchive m_arguments;
-  Archive m_results;
 };
 
-class Skeleton : public Dispatcher {
- public:
-  using Dispatcher::Dispatcher;
-};
-
+// Its thunks see the delegate as a handle of their interface, so that the object is called before anyone can look at
+// what is left of the arguments.
 class Scion : public Dispatcher {
  public:
   using Dispatcher::Dispatcher;
+  void SetDelegate(AnyInterface delegate) override { std::memcpy(m_delegate, &delegate, sizeof(delegate)); }
+
+ protected:
+  alignas(AnyInterface) octet_t m_delegate[sizeof(AnyInterface)] = {};  // as bytes may be seen as anything
 };
 
 // --- Factories, by the name of the interface
@@ -296,74 +241,45 @@ struct IScionFactory {
   virtual Scion* CreateScion() = 0;
 };
 
-template <typename Factory>
-std::map<std::string, Factory*>& FactoryTable() {
-  static std::map<std::string, Factory*>* const table = new std::map<std::string, Factory*>;
-  return *table;
-}
+void RegisterStub(ConstStringZ name, IStubFactory* factory);
+void UnregisterStub(ConstStringZ name);
+void RegisterSkeleton(ConstStringZ name, ISkeletonFactory* factory);
+void UnregisterSkeleton(ConstStringZ name);
+void RegisterScion(ConstStringZ name, IScionFactory* factory);
+void UnregisterScion(ConstStringZ name);
 
-inline void RegisterStub(ConstStringZ name, IStubFactory* factory) { FactoryTable<IStubFactory>()[name] = factory; }
-inline void UnregisterStub(ConstStringZ name) { FactoryTable<IStubFactory>().erase(name); }
-inline void RegisterSkeleton(ConstStringZ name, ISkeletonFactory* factory) {
-  FactoryTable<ISkeletonFactory>()[name] = factory;
-}
-inline void UnregisterSkeleton(ConstStringZ name) { FactoryTable<ISkeletonFactory>().erase(name); }
-inline void RegisterScion(ConstStringZ name, IScionFactory* factory) { FactoryTable<IScionFactory>()[name] = factory; }
-inline void UnregisterScion(ConstStringZ name) { FactoryTable<IScionFactory>().erase(name); }
-
+// RemoteError when there is none.
 template <typename Factory>
-Factory& FactoryOf(ConstStringZ name) {
-  const auto at = FactoryTable<Factory>().find(name);
-  if (at == FactoryTable<Factory>().end()) throw RemoteError("no remote interface of this name: " + std::string(name));
-  return *at->second;
-}
+Factory& FactoryOf(ConstStringZ name);
 
 // The objects that the other side may call, by number. A number is not given out again.
 class Server {
  public:
   typedef std::function<void(std::string const&)> ErrorFunction;
-  explicit Server(Channel& channel) : m_channel(channel) {}
+  explicit Server(Channel& channel);
+  ~Server();
 
   // The object must live until it is taken back. RemoteError for null and for an interface that is not registered.
   template <typename I>
   uint32 Export(ptr<I> const& object) {
-    if (!object) throw RemoteError("null cannot be exported");
-    Exported exported;
     if constexpr (InterfaceTypeTraits<I>::is_rmi) {
-      Skeleton* skeleton = FactoryOf<ISkeletonFactory>(GetIpcInterfaceName<I>()).CreateSkeleton();
-      exported = {std::shared_ptr<Dispatcher>(skeleton), skeleton};
+      return ExportSkeleton(object ? GetIpcInterfaceName<I>() : nullptr, object.Any());
     } else {
-      Scion* scion = FactoryOf<IScionFactory>(GetIpcInterfaceName<I>()).CreateScion();
-      exported = {std::shared_ptr<Dispatcher>(scion), scion};
+      return ExportScion(object ? GetIpcInterfaceName<I>() : nullptr, object.Any());
     }
-    exported.m_dispatcher->SetDelegate(object.Any());
-    m_objects[++m_lastNumber] = std::move(exported);
-    return m_lastNumber;
   }
   // Takes an object back: later calls of it are errors. False for a number that is not exported.
-  bool Unexport(uint32 number) { return m_objects.erase(number) > 0; }
+  bool Unexport(uint32 number);
 
   void SetMessageLimit(std::size_t bytes) { m_messageLimit = bytes; }
   // Is told each error, also those that go back to a caller.
-  void OnError(ErrorFunction function) { m_onError = std::move(function); }
+  void OnError(ErrorFunction function);
 
   // Carries out what waits in the channel. What a method throws, a bad message and a client that is gone do not come
   // out of here.
   void Serve() { ServeWithin(std::chrono::milliseconds(0)); }
   // The same, and waits for the first message up to `time`. False once the channel is closed.
-  bool ServeWithin(std::chrono::milliseconds time) {
-    try {
-      xvector<octet_t> message;
-      if (!(time.count() > 0 ? m_channel.ReceiveWithin(message, time) : m_channel.Receive(message))) {
-        return m_channel.IsOpen();
-      }
-      do Dispatch(message);
-      while (m_channel.Receive(message));
-    } catch (std::exception const& error) {
-      Report(error.what());
-    }
-    return m_channel.IsOpen();
-  }
+  bool ServeWithin(std::chrono::milliseconds time);
 
  private:
   struct Exported {
@@ -371,49 +287,14 @@ class Server {
     void* m_self = nullptr;                    // as its thunks see it
   };
 
-  // Throws only where the answer cannot be sent.
-  void Dispatch(xvector<octet_t> const& message) {
-    uint32 answer = 0;
-    Archive reply;
-    try {
-      const Archive results = Carry(message, answer);
-      if (!answer) return;
-      SerialiseVariableLengthUint(reply, answer);
-      reply << octet_t(AN_VALUES);
-      reply.Write(results.m_bytes.data(), results.m_bytes.size());
-      CheckMessageSize(reply.m_bytes.size(), m_messageLimit);
-    } catch (std::exception const& error) {
-      reply = ErrorReply(answer, error.what());
-    } catch (...) {
-      reply = ErrorReply(answer, "remote method failed");
-    }
-    if (answer) m_channel.Send(reply.m_bytes);
-  }
+  uint32 ExportSkeleton(ConstStringZ name, AnyInterface object);
+  uint32 ExportScion(ConstStringZ name, AnyInterface object);
+  uint32 Add(Exported exported, AnyInterface object);
 
-  Archive Carry(xvector<octet_t> const& message, uint32& answer) {
-    InputArchive ar(message);
-    uint32 object, method, number;
-    DeserialiseVariableLengthUint(ar, object);
-    DeserialiseVariableLengthUint(ar, method);
-    DeserialiseVariableLengthUint(ar, number);
-    answer = number;
-    CheckMessageSize(message.size(), m_messageLimit);
-    const auto at = m_objects.find(object);
-    if (at == m_objects.end()) throw RemoteError("no such remote object");
-    const Exported exported = at->second;
-    return exported.m_dispatcher->Call(exported.m_self, method, std::move(ar));
-  }
-
-  Archive ErrorReply(uint32 answer, xstring const& text) {
-    Report(text);
-    Archive reply;
-    SerialiseVariableLengthUint(reply, answer);
-    reply << octet_t(AN_ERROR) << text;
-    return reply;
-  }
-  void Report(std::string const& text) const {
-    if (m_onError) m_onError(text);
-  }
+  void Dispatch(xvector<octet_t> const& message);
+  Archive Carry(xvector<octet_t> const& message, uint32& answer);
+  Archive ErrorReply(uint32 answer, xstring const& text);
+  void Report(std::string const& text) const;
 
   Channel& m_channel;
   std::size_t m_messageLimit = kMessageLimit;
@@ -422,12 +303,12 @@ class Server {
   std::map<uint32, Exported> m_objects;
 };
 
+std::unique_ptr<Stub> ImportStub(ClientConnection& connection, uint32 object, ConstStringZ name);
+
 // The client's view of an exported object. The stub behind it is the caller's.
 template <typename I>
 std::unique_ptr<Stub> Import(ClientConnection& connection, uint32 object) {
-  std::unique_ptr<Stub> stub(FactoryOf<IStubFactory>(GetIpcInterfaceName<I>()).CreateStub());
-  stub->Connect(connection, object);
-  return stub;
+  return ImportStub(connection, object, GetIpcInterfaceName<I>());
 }
 
 }  // namespace vesk

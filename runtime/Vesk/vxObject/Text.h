@@ -2,6 +2,7 @@
 // own so that every reflected type prints, containers included. Numbers of 8 bits print as numbers, bool as a word.
 
 @import "Vesk/vxObject/Platform.h"
+
 #include <algorithm>
 #include <charconv>
 #include <cstring>
@@ -23,6 +24,12 @@ class basic_xstring : public std::basic_string<C> {
 typedef basic_xstring<char8> string8;
 typedef basic_xstring<char16> string16;
 typedef string8 xstring;
+
+namespace unqualified {
+using vesk::string16;
+using vesk::string8;
+using vesk::xstring;
+}  // namespace unqualified
 
 // Writes to a std::ostream, or without one into memory. What is written into memory without an indentation is put where
 // there is room for it at once; all else, and where there is none, goes the long way.

@@ -7,27 +7,25 @@
 namespace vesk {
 
 template <typename T>
-using EqualExpression = decltype(std::declval<T const&>() == std::declval<T const&>());
-template <typename T>
-using LessExpression = decltype(std::declval<T const&>() < std::declval<T const&>());
-template <typename T>
 using PrintExpression = decltype(std::declval<xostream&>() << std::declval<T const&>());
+template <typename T>
+using OffersPrint = Detector<void, PrintExpression, T>;
 
 template <typename T>
 bool VariableEqual(T const* a, T const* b) {
-  if constexpr (Detects<EqualExpression, T>) return *a == *b;
+  if constexpr (HasEqual<T>) return *a == *b;
   return a == b;
 }
 
 template <typename T>
 bool VariableLess(T const* a, T const* b) {
-  if constexpr (Detects<LessExpression, T>) return *a < *b;
+  if constexpr (HasLess<T>) return *a < *b;
   return a < b;
 }
 
 template <typename T>
 void PrintVariable(xostream& os, T const* x) {
-  if constexpr (Detects<PrintExpression, T>) {
+  if constexpr (PartsOffer<OffersPrint, T>::value) {
     os << *x;
   } else {
     os << "?";
@@ -62,7 +60,10 @@ void DestructArray(T* array, ssize_t begin, ssize_t end) {
 }
 
 template <typename T>
-constexpr bool IsSerialisable = std::is_enum<T>::value || Detects<SerialiseMember, T> || Detects<SerialiseFunction, T>;
+using OffersArchive =
+    std::disjunction<std::is_enum<T>, Detector<void, SerialiseMember, T>, Detector<void, SerialiseFunction, T>>;
+template <typename T>
+constexpr bool IsSerialisable = PartsOffer<OffersArchive, T>::value;
 
 template <typename T>
 void SerialiseArray(Archive& ar, T const* array, ssize_t begin, ssize_t end) {

@@ -16,18 +16,6 @@ namespace {
 
 using Bytes = vesk::xvector<vesk::octet_t>;
 
-// The objects that an archive made are the reader's to destroy.
-void DestroyObjects(vesk::InputArchive& ar) {
-  for (vesk::InputArchive::ReadObject const& object : ar.m_objects) {
-    const vesk::ptr<vesk::IPersistable> persistable(object.m_persistable);
-    if (persistable) {
-      persistable->DestroyObject();
-    } else if (object.m_type == vesk::ArchivedType<kinds::Size>()) {
-      delete static_cast<kinds::Size*>(object.m_self);
-    }
-  }
-}
-
 template <typename T>
 Bytes Written(T const& value) {
   vesk::Archive ar;
@@ -43,8 +31,8 @@ void ReadAndUse(Bytes bytes) {
   try {
     ar >> value;
     const T copy = value;
-    if constexpr (vesk::Detects<vesk::EqualExpression, T>) (void)(copy == value);
-    if constexpr (vesk::Detects<vesk::LessExpression, T>) (void)(copy < value);
+    if constexpr (vesk::HasEqual<T>) (void)(copy == value);
+    if constexpr (vesk::HasLess<T>) (void)(copy < value);
     if constexpr (vesk::Detects<vesk::PrintExpression, T>) (void)vxMakeString(value);
     const Bytes written = Written(value);
     if constexpr (!HasReferences) {
@@ -55,7 +43,7 @@ void ReadAndUse(Bytes bytes) {
     }
   } catch (vesk::ArchiveError const&) {
   }
-  DestroyObjects(ar);
+  ar.m_objects.Destroy();  // the reader's
 }
 
 void ReadObjectGraph(Bytes bytes) {
@@ -66,7 +54,7 @@ void ReadObjectGraph(Bytes bytes) {
     if (root) (void)Written(root);
   } catch (vesk::ArchiveError const&) {
   }
-  DestroyObjects(ar);
+  ar.m_objects.Destroy();  // the reader's
 }
 
 using Read = void (*)(Bytes);

@@ -316,6 +316,9 @@ class JsonReader {
       m_scanner.Expect('{');
       ExpectName("$type");
       const xstring name = m_scanner.ReadString8();
+      if (!IsTypeAllowed(m_limits.m_allow, m_limits.m_allowType, name)) {
+        m_scanner.FailAt(at, "type is not allowed: " + name);
+      }
       ExpectNext("$value");
       archive << name;
       ArchiveOne(archive, JsonTypeOfName(m_types, name));
@@ -458,7 +461,7 @@ class JsonReader {
   JsonLimits const& m_limits;
   std::size_t m_memory = 0;
   xvector<Object> m_objects;
-  std::size_t m_reader = 0;  // the object that is read, by number; 0 for the value
+  std::size_t m_reader = 0;                                   // the object that is read, by number; 0 for the value
   xvector<std::pair<std::size_t, std::size_t>> m_references;  // who leads to what
 };
 

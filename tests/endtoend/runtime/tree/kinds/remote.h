@@ -17,6 +17,18 @@ $interface+ rmi ICalc : vesk::IObject
 };
 $interface rmi IPlain { void Ping(); };
 $interface ipc IEmptyIpc { };
+// An object that archives could hold.
+$interface+ rmi IKept : vesk::IPersistable
+{
+    void Put([in] int32 n);
+    void Take([in] int32 more, [out] int32& n) const;
+};
+$class+ Kept isa IKept : model { int32 number; }
+{
+public:
+    void Put(int32 n) { number = n; }
+    void Take(int32 more, int32& n) const { n = number + more; }
+};
 
 $class+ Calc isa ICalc
 {

@@ -6,6 +6,8 @@ void Unregister_Project_check();
 void CheckReflection();
 void CheckInterfaces();
 void CheckKinds();
+void CheckBareTypes();
+void CheckSignatures();
 void CheckArchives();
 void CheckSchemas();
 void CheckChanges();
@@ -21,12 +23,14 @@ void CheckRemote();
 void CheckRemoteErrors();
 void CheckRemoteMessages();
 void CheckRemoteAnswers();
+void CheckRemotePersistable();
 void CheckJsonBothWays();
 void CheckJsonErrors();
 void CheckJsonObjects();
 void CheckAccess();
 void CheckGraph();
 void CheckCaches();
+void CheckCachesInTemplates();
 void CheckVisiting();
 void CheckEvictions();
 void CheckWritesInside();
@@ -57,13 +61,14 @@ struct Last
 int main()
 {
     Register_Project_check();
-    for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckArchives, CheckSchemas, CheckChanges,
-                       CheckReleases, CheckThreads, CheckHostileReferences, CheckHostileTypes, CheckHostileVariants,
-                       CheckHostileNumbers, CheckHostileSizes, CheckLimits, CheckRemote, CheckRemoteErrors,
-                       CheckRemoteMessages, CheckRemoteAnswers, CheckJsonBothWays, CheckJsonErrors, CheckJsonObjects,
-                       CheckAccess, CheckGraph, CheckCaches, CheckVisiting, CheckEvictions, CheckWritesInside,
-                       CheckErrorsInside, CheckFields, CheckChains, CheckManyLinks, CheckManyWrites, CheckGraphThreads,
-                       CheckLinkedObjects, CheckReadClasses, CheckHeap, CheckTexts, CheckCopies})
+    for (auto check : {CheckReflection, CheckInterfaces, CheckKinds, CheckBareTypes, CheckSignatures, CheckArchives,
+                       CheckSchemas, CheckChanges, CheckReleases, CheckThreads, CheckHostileReferences,
+                       CheckHostileTypes, CheckHostileVariants, CheckHostileNumbers, CheckHostileSizes, CheckLimits,
+                       CheckRemote, CheckRemoteErrors, CheckRemoteMessages, CheckRemoteAnswers, CheckRemotePersistable,
+                       CheckJsonBothWays, CheckJsonErrors, CheckJsonObjects, CheckAccess, CheckGraph, CheckCaches,
+                       CheckCachesInTemplates, CheckVisiting, CheckEvictions, CheckWritesInside, CheckErrorsInside,
+                       CheckFields, CheckChains, CheckManyLinks, CheckManyWrites, CheckGraphThreads, CheckLinkedObjects,
+                       CheckReadClasses, CheckHeap, CheckTexts, CheckCopies})
     {
         check();
     }

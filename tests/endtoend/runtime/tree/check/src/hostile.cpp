@@ -125,6 +125,20 @@ void CheckHostileTypes()
         held += !isRefused;
     }
     CHECK(held > 20 && held < int(names.size()), true);
+
+    // What a program does not want is not made: by class, by the name of the type.
+    vesk::openvariant<int32> any;
+    auto refuses = [&any](auto const& value, auto allow, auto allowType) {
+        vesk::InputArchive ar(Written(vesk::openvariant<int32>(value)));
+        ar.m_objects.m_allow = allow;
+        ar.m_objects.m_allowType = allowType;
+        return Throws([&] { ar >> any; });
+    };
+    auto noClass = [](vesk::ReflectedClass const&) { return false; };
+    auto noSize = [](vesk::xstring const& type) { return type != "kinds::Size"; };
+    CHECK(refuses(Size(3), noClass, nullptr) && refuses(Size(3), nullptr, noSize), true);
+    CHECK(refuses(int32(3), noClass, noSize) || any.as<int32>() != 3, false);
+    CHECK(refuses(Size(3), nullptr, nullptr) || any.as<Size>().width != 3, false);
 }
 
 template <typename V>

@@ -245,6 +245,12 @@ void CheckJsonErrors()
     CHECK(Read<vesk::openvariant<int32>>(Q("{'$type':'kinds::Everything','$value':{}}")),
           "references in a variant: kinds::Everything");
     CHECK(Json(vesk::openvariant<int32>(vesk::xlist<int32>{1})), "type of an openvariant is not registered");
+    vesk::openvariant<int32> any;
+    vesk::JsonLimits noSize;
+    noSize.m_allowType = [](vesk::xstring const& type) { return type != "kinds::Size"; };
+    CHECK(ErrorOf(any, Q("{'$type':'kinds::Size','$value':{}}"), noSize),
+          "line 1, column 1: type is not allowed: kinds::Size");
+    CHECK(ErrorOf(any, Q("{'$type':'int32','$value':1}"), noSize), "none");
     // Limits.
     CHECK(Read<Tree>(std::string(200000, '[')), "line 1, column 101: nested too deeply");
     vesk::JsonLimits limits;

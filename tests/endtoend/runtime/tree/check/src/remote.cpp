@@ -207,3 +207,20 @@ void CheckRemoteAnswers()
         vesk::FactoryOf<vesk::IStubFactory>(vesk::GetIpcInterfaceName<ICalc>()).CreateStub());
     CHECK(ErrorOf([&] { vesk::ptr<ICalc>(loose->Interface())->Ping(); }), "stub without a connection");
 }
+
+void CheckRemotePersistable()
+{
+    Kept kept;
+    Wire wire;
+    const vesk::uint32 number = wire.server.Export(vesk::ptr<IKept>(&kept));
+    const auto stub = vesk::Import<IKept>(wire.client, number);
+    const vesk::ptr<IKept> far(stub->Interface());
+    far->Put(5);
+    int32 n = 0;
+    far->Take(1, n);
+    CHECK(n, 6);
+
+    // The stub itself holds nothing to be archived.
+    vesk::Archive ar;
+    CHECK(Throws([&] { far->Serialise(ar); }) && Throws([&] { vesk::WriteObject(far); }), true);
+}

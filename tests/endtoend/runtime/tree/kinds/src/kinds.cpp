@@ -3,6 +3,8 @@
 @import "kinds/graph.h"
 @import "kinds/remote.h"
 @import "kinds/plain.h"
+@import "kinds/bare.h"
+@import "kinds/cached.h"
 
 vxDefineTarget(kinds, 3)
 

@@ -1,5 +1,7 @@
-// A graph, a heap and archives in each of several threads at once. Prints what the threads come to.
+// A graph, a heap, archives, a connection and values by name in each of several threads at once. Prints what the threads
+// come to.
 @import "Vesk/vxObject/IObject.h"
+@import "Vesk/vxObject/Json.h"
 
 #include <cstdio>
 #include <thread>
@@ -14,7 +16,17 @@ public:
     $dep int32 twice = { twice = number * 2; };
     $cache <<async>> int32 later(int32 n) const with int32 in = { in = number + n; }; { return in; }
 };
-$struct Plain : model { int32 number; xmap<int32,int32> map; } { };
+$model+ Plain { int32 number; xmap<int32,int32> map; openvariant<int32> any; };
+$interface+ rmi ISum : vesk::IObject
+{
+    void Add([in] int32 n, [out] int32& total);
+};
+$class+ Sum isa ISum
+{
+public:
+    void Add(int32 n, int32& out) { out = total += n; }
+    $int32 total;
+};
 
 $struct Chained
 {
@@ -24,6 +36,25 @@ $struct Chained
 };
 $function Part* MakePart();
 $function Part* MakePart() { return $new Part(); }
+
+// Calls an object of this thread, and changes it by name.
+int CallSum(int rounds)
+{
+    Sum sum;
+    sum.total = 0;
+    vesk::LocalChannel channel;
+    vesk::Server server(channel.Server());
+    vesk::ClientConnection client(channel.Client(), [&server] { server.Serve(); });
+    const auto stub = vesk::Import<ISum>(client, server.Export(vesk::ptr<ISum>(&sum)));
+    const vesk::ptr<ISum> far(stub->Interface());
+    int32 total = 0;
+    for (int i = 0; i < rounds; ++i)
+    {
+        far->Add(i, total);
+        vesk::Value::Of(sum).Find("total").Set(int32(total + 1));
+    }
+    return total;
+}
 
 int Work(int rounds)
 {
@@ -45,6 +76,10 @@ int Work(int rounds)
         part.number = i;
         plain.number = i;
         plain.map[i] = i;
+        plain.any = vesk::openvariant<int32>(int32(i));
+        Plain copy;
+        vesk::FromJsonText(copy, vesk::ToJsonText(plain));
+        result += copy.any.as<int32>() + int32(copy.map.size());
         result += chain.back().depth + part.twice + part.later(i);
         result += int32(vesk::RunAsyncCalculations());
         const vesk::ptr<IPart> read = vesk::ReadObject<IPart>(vesk::WriteObject(vesk::ptr<IPart>(&part)));
@@ -55,7 +90,7 @@ int Work(int rounds)
         if (!vesk::Find<vesk::ReflectedClass>("Part")) result = 0;
     }
     vesk::EvictionQueue::Get(0).EvictDownTo(-1);
-    return result + changes + int32(vesk::EvictionQueue::Get(0).Count());
+    return result + changes + CallSum(rounds) + int32(vesk::EvictionQueue::Get(0).Count());
 }
 
 int main()

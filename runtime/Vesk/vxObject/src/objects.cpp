@@ -1,0 +1,184 @@
+// The objects of archives: how they are mentioned, written, read and destroyed; the heap of `$new`.
+
+@import "Vesk/vxObject/IObject.h"
+@import "shared.h"
+
+#include <algorithm>
+#include <cstring>
+#if defined(__linux__)
+#include <pthread.h>
+#endif
+
+namespace vesk {
+
+std::pair<std::size_t, bool> WrittenObjects::Insert(WrittenObject const& object, std::type_info const& type) {
+  const auto [at, isNew] = m_numbers.insert({Key(object.m_object, type), m_list.size() + 1});
+  if (isNew) m_list.push_back(object);
+  return {at->second, isNew};
+}
+
+void ReadObjects::Destroy(std::size_t first) {
+  for (std::size_t i = first; i < m_list.size(); ++i) {
+    if (m_list[i].m_self) m_list[i].m_forget(m_list[i]);
+  }
+  while (m_list.size() > first) {
+    const auto object = m_list.back();
+    m_list.pop_back();
+    if (object.m_self) object.m_destroy(object);
+  }
+}
+
+std::size_t StackLeft() {
+  char const* here = static_cast<char const*>(__builtin_frame_address(0));
+#if defined(__linux__)
+  static thread_local char const* s_end = nullptr;
+  if (!s_end) {
+    pthread_attr_t attributes;
+    void* end = nullptr;
+    std::size_t size;
+    if (pthread_getattr_np(pthread_self(), &attributes) == 0) {
+      pthread_attr_getstack(&attributes, &end, &size);
+      pthread_attr_destroy(&attributes);
+    }
+    s_end = static_cast<char const*>(end);
+  }
+#else
+  static thread_local char const* s_end = here - 256 * 1024;
+#endif
+  return here > s_end ? static_cast<std::size_t>(here - s_end) : 0;
+}
+
+// --- References
+
+// Where contents stand within each other the stack grows with them.
+constexpr std::size_t LeastStackForContent = 128 * 1024;
+
+void WritePersistable(Archive& ar, WrittenObject const& object) {
+  ptr<IPersistable>(object.m_persistable)->Serialise(ar);
+}
+
+void WriteContents(Archive& ar) {
+  WrittenObjects& objects = ar.m_objects;
+  if (objects.m_isWriting) return;
+  FlagScope scope(objects.m_isWriting);
+  while (objects.m_next < objects.m_list.size()) {
+    const WrittenObject object = objects.m_list[objects.m_next++];
+    object.m_write(ar, object);
+  }
+}
+
+bool WriteMention(Archive& ar, WrittenObject const& object, std::type_info const& type) {
+  if (ar.m_writesAddresses) {
+    ar.Write(&object.m_object, sizeof(object.m_object));
+    return false;
+  }
+  if (!object.m_object) {
+    SerialiseVariableLengthUint(ar, 0);
+    return false;
+  }
+  const auto [number, isNew] = ar.m_objects.Insert(object, type);
+  SerialiseVariableLengthUint(ar, isNew ? number + 1 : number);
+  return isNew;
+}
+
+EMention ReadMention(InputArchive& ar, std::size_t& number) {
+  DeserialiseVariableLengthUint(ar, number);
+  const std::size_t known = ar.m_objects.m_list.size();
+  if (number == 0) return EMention::Null;
+  if (number <= known) return EMention::Known;
+  if (number > known + 2) throw ArchiveError("reference to an object that is not in the archive");
+  if (known >= ar.m_limits.m_objects) throw ArchiveError("too many objects in an archive");
+  const bool hasContent = number == known + 1;
+  number = known + 1;
+  return hasContent ? EMention::NewWithContent : EMention::New;
+}
+
+void ReadContent(InputArchive& ar, std::size_t position) {
+  if (ar.m_objects.m_list[position].m_isRead) return;
+  if (StackLeft() < LeastStackForContent) throw ArchiveError("objects nested too deeply in an archive");
+  ar.m_objects.m_list[position].m_isRead = true;
+  const auto object = ar.m_objects.m_list[position];
+  object.m_read(ar, object);
+}
+
+bool ListsInterface(ReflectedClass const& record, ConstStringZ name) {
+  ConstStringZ const* end = record.m_interfaces + record.m_numBaseInterfaces + record.m_numInterfaces;
+  return std::any_of(record.m_interfaces, end, [name](ConstStringZ other) { return std::strcmp(name, other) == 0; });
+}
+
+void ReadObjectMark(InputArchive& ar) {
+  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
+  octet_t const* mark = ar.Take(sizeof(ObjectMark));
+  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
+  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
+}
+
+// --- The heap
+
+ObjectHeap& ObjectHeap::Get() { return Shared<ObjectHeap>(); }
+
+void ObjectHeap::Add(ptr<IObject> const& object, std::size_t size) {
+  std::lock_guard<std::mutex> lock(m_mutex);
+  m_objects[Address(object.Object())] = {object, size, ++m_lastSerial};
+}
+
+void ObjectHeap::Remove(void const* object) {
+  std::lock_guard<std::mutex> lock(m_mutex);
+  m_objects.erase(Address(object));
+}
+
+ssize_t ObjectHeap::Count() const {
+  std::lock_guard<std::mutex> lock(m_mutex);
+  return static_cast<ssize_t>(m_objects.size());
+}
+
+ssize_t ObjectHeap::Collect(xvector<ptr<IObject>> const& roots) {
+  m_reached.clear();
+  for (ptr<IObject> const& root : roots) VisitObject(root);
+  while (!m_pending.empty()) {
+    const ptr<IObject> object = m_pending.back();
+    m_pending.pop_back();
+    object->VisitObjects(*this);
+  }
+  ssize_t count = 0;
+  for (Made const& made : Unreached()) {
+    if (!Take(made)) continue;
+    made.m_object->DestroyObject();
+    ++count;
+  }
+  return count;
+}
+
+void ObjectHeap::VisitObject(ptr<IObject> const& object) {
+  if (!object) return;
+  const ptr<IObject> whole = WholeObject(object);
+  if (m_reached.insert(whole.Object()).second) m_pending.push_back(whole);
+}
+
+ptr<IObject> ObjectHeap::WholeObject(ptr<IObject> const& object) const {
+  std::lock_guard<std::mutex> lock(m_mutex);
+  auto at = m_objects.upper_bound(Address(object.Object()));
+  if (at == m_objects.begin()) return object;
+  --at;
+  return Address(object.Object()) - at->first < at->second.m_size ? at->second.m_object : object;
+}
+
+xvector<ObjectHeap::Made> ObjectHeap::Unreached() const {
+  std::lock_guard<std::mutex> lock(m_mutex);
+  xvector<Made> unreached;
+  for (auto const& [address, made] : m_objects) {
+    if (m_reached.count(made.m_object.Object()) == 0) unreached.push_back(made);
+  }
+  std::sort(unreached.begin(), unreached.end(), [](Made const& a, Made const& b) { return a.m_serial < b.m_serial; });
+  return unreached;
+}
+
+bool ObjectHeap::Take(Made const& made) {
+  std::lock_guard<std::mutex> lock(m_mutex);
+  const auto at = m_objects.find(Address(made.m_object.Object()));
+  if (at == m_objects.end() || at->second.m_serial != made.m_serial) return false;
+  m_objects.erase(at);
+  return true;
+}
+
+}  // namespace vesk

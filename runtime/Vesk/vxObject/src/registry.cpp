@@ -1,0 +1,161 @@
+// The tables of what is registered.
+
+@import "Vesk/vxObject/Registry.h"
+@import "shared.h"
+
+namespace vesk {
+
+template <typename R>
+struct RegisteredRecord {
+  R const* m_record;
+  XTarget* m_target;
+};
+
+// By name: the record in use in front, behind it the copies of it that other modules of the process have.
+template <typename R>
+std::map<std::string, std::vector<RegisteredRecord<R>>>& RecordTable() {
+  return Shared<std::map<std::string, std::vector<RegisteredRecord<R>>>>();
+}
+
+template <typename R>
+NSE RegisterRecord(R const* record, XTarget* target) {
+  std::vector<RegisteredRecord<R>>& records = RecordTable<R>()[record->m_name];
+  for (RegisteredRecord<R> const& registered : records) {
+    if (registered.m_record == record) return NSE_OK;
+  }
+  if (!records.empty() && LayoutText(*records.front().m_record) != LayoutText(*record)) return NSE_ALREADY_DEFINED;
+  records.push_back({record, target});
+  return NSE_OK;
+}
+
+template <typename R>
+R const* Find(std::string const& name) {
+  const auto at = RecordTable<R>().find(name);
+  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_record;
+}
+
+template <typename R>
+xvector<R const*> All() {
+  xvector<R const*> records;
+  for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.front().m_record);
+  return records;
+}
+
+template <typename R>
+XTarget* TargetOf(R const& record) {
+  const auto at = RecordTable<R>().find(record.m_name);
+  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_target;
+}
+
+// --- Types
+
+struct TypeOpsByText {
+  std::map<xstring, TypeOps const*> m_table = {
+      {"bool", &MakeTypeOps<bool>()},       {"int8", &MakeTypeOps<int8>()},        {"int16", &MakeTypeOps<int16>()},
+      {"int32", &MakeTypeOps<int32>()},     {"int64", &MakeTypeOps<int64>()},      {"int128", &MakeTypeOps<int128>()},
+      {"uint8", &MakeTypeOps<uint8>()},     {"uint16", &MakeTypeOps<uint16>()},    {"uint32", &MakeTypeOps<uint32>()},
+      {"uint64", &MakeTypeOps<uint64>()},   {"uint128", &MakeTypeOps<uint128>()},  {"float32", &MakeTypeOps<float32>()},
+      {"float64", &MakeTypeOps<float64>()}, {"char8", &MakeTypeOps<char8>()},      {"char16", &MakeTypeOps<char16>()},
+      {"string8", &MakeTypeOps<string8>()}, {"string16", &MakeTypeOps<string16>()}};
+};
+std::map<xstring, TypeOps const*>& TypeOpsTable() { return Shared<TypeOpsByText>().m_table; }
+
+bool RegisterTypeOps(ReflectionByteCodeValue const& type, TypeOps const* ops) {
+  TypeOpsTable().insert({type.m_text, ops});
+  return true;
+}
+
+TypeOps const* FindTypeOps(ReflectedType const& type) {
+  if (type.m_code >= RC_VOLATILE && type.m_code <= RC_OFFSETTABLE) return FindTypeOps(type.m_inner.front());
+  if (type.m_code == RC_CLASS) {
+    ReflectedClass const* record = Find<ReflectedClass>(type.m_name);
+    return record ? &record->m_ops : nullptr;
+  }
+  if (type.m_code == RC_VARIANT) {
+    ReflectedVariant const* record = Find<ReflectedVariant>(type.m_name);
+    return record ? &record->m_ops : nullptr;
+  }
+  if (type.m_code == RC_ENUM) return &MakeTypeOps<int32>();
+  if (type.m_code == RC_TYPEDEF) {
+    ReflectedTypedef const* record = Find<ReflectedTypedef>(type.m_name);
+    return record ? FindTypeOps(DecodeType({record->m_type, record->m_strings})) : nullptr;
+  }
+  ReflectedType plain = type;
+  plain.m_metadata.clear();
+  const auto at = TypeOpsTable().find(vxMakeString(plain));
+  return at == TypeOpsTable().end() ? nullptr : at->second;
+}
+
+bool IsTypeAllowed(std::function<bool(ReflectedClass const&)> const& allow,
+                   std::function<bool(xstring const&)> const& allowType, xstring const& name) {
+  ReflectedClass const* record = allow ? Find<ReflectedClass>(name) : nullptr;
+  return (!record || allow(*record)) && (!allowType || allowType(name));
+}
+
+TypeOps const* FindTypeOps(ReflectionByteCode code) { return FindTypeOps(DecodeType(code)); }
+
+void PrintValue(xostream& os, ReflectedType const& type, void const* value) {
+  if (type.m_code == RC_ENUM) {
+    PrintEnum(os, Find<ReflectedEnum>(type.m_name), *static_cast<int32 const*>(value));
+    return;
+  }
+  TypeOps const* ops = FindTypeOps(type);
+  if (ops && ops->m_print) {
+    ops->m_print(os, value);
+  } else {
+    os << '?';
+  }
+}
+
+// --- Unloading
+
+template <typename R>
+void UnregisterRecords(XTarget const* target) {
+  auto& table = RecordTable<R>();
+  for (auto at = table.begin(); at != table.end();) {
+    std::vector<RegisteredRecord<R>>& records = at->second;
+    records.erase(std::remove_if(records.begin(), records.end(),
+                                 [=](RegisteredRecord<R> const& record) { return record.m_target == target; }),
+                  records.end());
+    at = records.empty() ? table.erase(at) : std::next(at);
+  }
+}
+
+void UnregisterTarget(XTarget const* target) {
+  UnregisterRecords<ReflectedClass>(target);
+  UnregisterRecords<ReflectedInterface>(target);
+  UnregisterRecords<ReflectedEnum>(target);
+  UnregisterRecords<ReflectedVariant>(target);
+  UnregisterRecords<ReflectedFunctor>(target);
+  UnregisterRecords<ReflectedGlobalFunction>(target);
+  UnregisterRecords<ReflectedGlobalVariable>(target);
+  UnregisterRecords<ReflectedTypedef>(target);
+}
+
+XTarget::~XTarget() {
+  if (IsProcessEnding(this)) return;
+  UnregisterTarget(this);
+  auto& table = TypeOpsTable();
+  for (auto at = table.begin(); at != table.end();) {
+    at = ModuleOf(at->second) == ModuleOf(this) ? table.erase(at) : std::next(at);
+  }
+}
+
+// --- What the header declares for each kind of record
+
+#define VESK_RECORD_KIND(R)                                                          \
+  NSE Register##R(R const* record, XTarget* t) { return RegisterRecord(record, t); } \
+  template R const* Find(std::string const&);                                        \
+  template xvector<R const*> All();                                                  \
+  template XTarget* TargetOf(R const&);
+
+VESK_RECORD_KIND(ReflectedClass)
+VESK_RECORD_KIND(ReflectedInterface)
+VESK_RECORD_KIND(ReflectedEnum)
+VESK_RECORD_KIND(ReflectedVariant)
+VESK_RECORD_KIND(ReflectedFunctor)
+VESK_RECORD_KIND(ReflectedGlobalFunction)
+VESK_RECORD_KIND(ReflectedGlobalVariable)
+VESK_RECORD_KIND(ReflectedTypedef)
+
+}  // namespace vesk

@@ -1,0 +1,273 @@
+// Remote calls: what carries messages within a thread, and how either side makes and reads them.
+
+@import "Vesk/vxObject/IObject.h"
+@import "shared.h"
+
+#include <algorithm>
+
+namespace vesk {
+
+// --- The channel of a thread
+
+LocalChannel::LocalChannel() : m_ends{End(m_queues[0], m_queues[1]), End(m_queues[1], m_queues[0])} {}
+LocalChannel::~LocalChannel() {}
+
+void LocalChannel::End::Send(xvector<octet_t> const& message) { m_out.push_back(message); }
+
+bool LocalChannel::End::Receive(xvector<octet_t>& message) {
+  if (m_in.empty()) return false;
+  message = std::move(m_in.front());
+  m_in.pop_front();
+  return true;
+}
+
+void CheckMessageSize(std::size_t size, std::size_t limit) {
+  if (size > limit) throw RemoteError(vxMakeString("message of " << size << " bytes, the limit is " << limit));
+}
+
+// --- Client
+
+// A call within another one stands behind it in the list.
+struct ClientConnection::Pending {
+  Pending(ClientConnection& connection, uint32 answer, PendingResponse& response)
+      : m_connection(connection), m_answer(answer), m_response(response) {
+    connection.m_pending.push_back(this);
+  }
+  ~Pending() { m_connection.m_pending.pop_back(); }
+  Pending(Pending const&) = delete;
+  void operator=(Pending const&) = delete;
+
+  ClientConnection& m_connection;
+  uint32 m_answer;
+  PendingResponse& m_response;
+  bool m_isDone = false;
+  std::string m_error;
+};
+
+ClientConnection::ClientConnection(Channel& channel, std::function<void()> serve)
+    : m_channel(channel), m_serve(std::move(serve)) {}
+ClientConnection::~ClientConnection() {}
+
+void ClientConnection::Send(Archive const& message) {
+  CheckMessageSize(message.m_bytes.size(), m_messageLimit);
+  m_channel.Send(message.m_bytes);
+}
+
+void ClientConnection::Call(Archive const& message, uint32 answer, PendingResponse& response) {
+  Pending pending(*this, answer, response);
+  Send(message);
+  if (m_serve) m_serve();
+  const auto end = std::chrono::steady_clock::now() + m_timeout;
+  xvector<octet_t> bytes;
+  while (!pending.m_isDone) {
+    const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
+    if (!m_channel.ReceiveWithin(bytes, std::max(left, std::chrono::milliseconds(0)))) {
+      if (!m_channel.IsOpen()) throw ChannelClosed("the other side is gone");
+      throw RemoteTimeout("remote call without an answer");
+    }
+    Dispatch(bytes);
+  }
+  if (!pending.m_error.empty()) throw RemoteError(pending.m_error);
+}
+
+// An answer that nobody waits for any more is dropped.
+void ClientConnection::Dispatch(xvector<octet_t> const& message) {
+  CheckMessageSize(message.size(), m_messageLimit);
+  if (message.empty()) throw RemoteError("empty message");
+  InputArchive ar(message);
+  uint32 answer;
+  DeserialiseVariableLengthUint(ar, answer);
+  const auto at = std::find_if(m_pending.begin(), m_pending.end(), [=](Pending* p) { return p->m_answer == answer; });
+  if (at == m_pending.end()) return;
+  Pending& pending = **at;
+  pending.m_isDone = true;
+  try {
+    ReadAnswer(ar, pending);
+  } catch (std::exception const& error) {
+    pending.m_error = std::string("bad answer: ") + error.what();
+  }
+}
+
+void ClientConnection::ReadAnswer(InputArchive& ar, Pending& pending) {
+  octet_t kind;
+  ar.Read(&kind, 1);
+  if (kind == AN_VALUES) {
+    pending.m_response.m_fn(ar, pending.m_response.OutParams());
+  } else {
+    xstring error;
+    ar >> error;
+    pending.m_error = error.empty() ? "remote call failed" : error;
+  }
+  if (ar.Remaining() > 0) throw RemoteError("bytes behind the values");
+}
+
+Stub::~Stub() {}
+
+Archive& Stub::StubBegin(ssize_t method, PendingResponse* response) const {
+  m_response.reset(response);
+  if (!m_connection) throw RemoteError("stub without a connection");
+  m_message = Archive();
+  m_answer = response ? m_connection->NextAnswer() : 0;
+  SerialiseVariableLengthUint(m_message, m_object);
+  SerialiseVariableLengthUint(m_message, method);
+  SerialiseVariableLengthUint(m_message, m_answer);
+  return m_message;
+}
+
+void Stub::StubEnd() const {
+  const Archive message = std::move(m_message);
+  const std::unique_ptr<PendingResponse> response = std::move(m_response);
+  if (response) {
+    m_connection->Call(message, m_answer, *response);
+  } else {
+    m_connection->Send(message);
+  }
+}
+
+std::unique_ptr<Stub> ImportStub(ClientConnection& connection, uint32 object, ConstStringZ name) {
+  std::unique_ptr<Stub> stub(FactoryOf<IStubFactory>(name).CreateStub());
+  stub->Connect(connection, object);
+  return stub;
+}
+
+// --- Server
+
+Dispatcher::Dispatcher(ThunkFn const* thunks, ssize_t count) : m_thunks(thunks), m_count(count) {}
+Dispatcher::~Dispatcher() {}
+
+// The call that is carried out; the one around it goes on with what is its own.
+struct Dispatcher::Scope {
+  Scope(Dispatcher& dispatcher, InputArchive arguments)
+      : m_dispatcher(dispatcher),
+        m_arguments(std::exchange(dispatcher.m_arguments, std::move(arguments))),
+        m_results(std::exchange(dispatcher.m_results, Archive())) {}
+  ~Scope() {
+    m_dispatcher.m_arguments = std::move(m_arguments);
+    m_dispatcher.m_results = std::move(m_results);
+  }
+  Scope(Scope const&) = delete;
+  void operator=(Scope const&) = delete;
+
+  Dispatcher& m_dispatcher;
+  InputArchive m_arguments;
+  Archive m_results;
+};
+
+Archive Dispatcher::Call(void* self, ssize_t method, InputArchive arguments) {
+  if (method < 0 || method >= m_count) throw RemoteError("no such remote method");
+  const Scope scope(*this, std::move(arguments));
+  m_thunks[method](self);
+  CheckArgumentsRead();
+  return std::move(m_results);
+}
+
+void Dispatcher::CheckArgumentsRead() const {
+  if (m_arguments.Remaining() > 0) throw RemoteError("bytes behind the arguments");
+}
+
+template <typename Factory>
+std::map<std::string, Factory*>& FactoryTable() {
+  return Shared<std::map<std::string, Factory*>>();
+}
+
+void RegisterStub(ConstStringZ name, IStubFactory* factory) { FactoryTable<IStubFactory>()[name] = factory; }
+void UnregisterStub(ConstStringZ name) { FactoryTable<IStubFactory>().erase(name); }
+void RegisterSkeleton(ConstStringZ name, ISkeletonFactory* factory) {
+  FactoryTable<ISkeletonFactory>()[name] = factory;
+}
+void UnregisterSkeleton(ConstStringZ name) { FactoryTable<ISkeletonFactory>().erase(name); }
+void RegisterScion(ConstStringZ name, IScionFactory* factory) { FactoryTable<IScionFactory>()[name] = factory; }
+void UnregisterScion(ConstStringZ name) { FactoryTable<IScionFactory>().erase(name); }
+
+template <typename Factory>
+Factory& FactoryOf(ConstStringZ name) {
+  const auto at = FactoryTable<Factory>().find(name);
+  if (at == FactoryTable<Factory>().end()) throw RemoteError("no remote interface of this name: " + std::string(name));
+  return *at->second;
+}
+template IStubFactory& FactoryOf<IStubFactory>(ConstStringZ);
+template ISkeletonFactory& FactoryOf<ISkeletonFactory>(ConstStringZ);
+template IScionFactory& FactoryOf<IScionFactory>(ConstStringZ);
+
+Server::Server(Channel& channel) : m_channel(channel) {}
+Server::~Server() {}
+
+uint32 Server::ExportSkeleton(ConstStringZ name, AnyInterface object) {
+  if (!name) throw RemoteError("null cannot be exported");
+  Skeleton* skeleton = FactoryOf<ISkeletonFactory>(name).CreateSkeleton();
+  return Add({std::shared_ptr<Dispatcher>(skeleton), skeleton}, object);
+}
+uint32 Server::ExportScion(ConstStringZ name, AnyInterface object) {
+  if (!name) throw RemoteError("null cannot be exported");
+  Scion* scion = FactoryOf<IScionFactory>(name).CreateScion();
+  return Add({std::shared_ptr<Dispatcher>(scion), scion}, object);
+}
+uint32 Server::Add(Exported exported, AnyInterface object) {
+  exported.m_dispatcher->SetDelegate(object);
+  m_objects[++m_lastNumber] = std::move(exported);
+  return m_lastNumber;
+}
+bool Server::Unexport(uint32 number) { return m_objects.erase(number) > 0; }
+
+void Server::OnError(ErrorFunction function) { m_onError = std::move(function); }
+
+bool Server::ServeWithin(std::chrono::milliseconds time) {
+  try {
+    xvector<octet_t> message;
+    if (!(time.count() > 0 ? m_channel.ReceiveWithin(message, time) : m_channel.Receive(message))) {
+      return m_channel.IsOpen();
+    }
+    do Dispatch(message);
+    while (m_channel.Receive(message));
+  } catch (std::exception const& error) {
+    Report(error.what());
+  }
+  return m_channel.IsOpen();
+}
+
+// Throws only where the answer cannot be sent.
+void Server::Dispatch(xvector<octet_t> const& message) {
+  uint32 answer = 0;
+  Archive reply;
+  try {
+    const Archive results = Carry(message, answer);
+    if (!answer) return;
+    SerialiseVariableLengthUint(reply, answer);
+    reply << octet_t(AN_VALUES);
+    reply.Write(results.m_bytes.data(), results.m_bytes.size());
+    CheckMessageSize(reply.m_bytes.size(), m_messageLimit);
+  } catch (std::exception const& error) {
+    reply = ErrorReply(answer, error.what());
+  } catch (...) {
+    reply = ErrorReply(answer, "remote method failed");
+  }
+  if (answer) m_channel.Send(reply.m_bytes);
+}
+
+Archive Server::Carry(xvector<octet_t> const& message, uint32& answer) {
+  InputArchive ar(message);
+  uint32 object, method, number;
+  DeserialiseVariableLengthUint(ar, object);
+  DeserialiseVariableLengthUint(ar, method);
+  DeserialiseVariableLengthUint(ar, number);
+  answer = number;
+  CheckMessageSize(message.size(), m_messageLimit);
+  const auto at = m_objects.find(object);
+  if (at == m_objects.end()) throw RemoteError("no such remote object");
+  const Exported exported = at->second;
+  return exported.m_dispatcher->Call(exported.m_self, method, std::move(ar));
+}
+
+Archive Server::ErrorReply(uint32 answer, xstring const& text) {
+  Report(text);
+  Archive reply;
+  SerialiseVariableLengthUint(reply, answer);
+  reply << octet_t(AN_ERROR) << text;
+  return reply;
+}
+
+void Server::Report(std::string const& text) const {
+  if (m_onError) m_onError(text);
+}
+
+}  // namespace vesk
