@@ -2,6 +2,7 @@
 """Translates a source of every kind and variation, builds it with g++ against the runtime, and runs what comes of it;
 the same for the tour. clang++ compiles the same text without a complaint."""
 
+import re
 import shutil
 import subprocess
 import sys
@@ -15,11 +16,11 @@ ROOT = HERE.parent.parent
 TOUR = ROOT / "examples" / "tour"
 
 
-def build(binary, tree, workspace_file):
+def build(binary, tree, workspace_file, keys=""):
     """A workspace with a copy of the tree, built without a warning."""
     need("g++")
     workspace = Workspace(binary, {"all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} '
-                                              f'workspaces = {{ "{workspace_file}" }}'})
+                                              f'workspaces = {{ "{workspace_file}" }} {keys}'})
     shutil.copytree(tree, workspace.path("tree"))
     holds(workspace.run("all.qrex"), "\nCompleted..")
     for word in (" : warning ", " warning: ", " error: ", " : error "):
@@ -134,6 +135,17 @@ def test_every_kind(binary):
                            "-Dshapes_API= -Wno-logical-op-parentheses -Wno-deprecated-declarations")
 
 
+def test_compilable_text(binary):
+    """What does not compile without the key: with g++, with clang++, and with clang++ as Visual C++ reads it."""
+    with build(binary, HERE / "runtime" / "tree", "compilable.qrws", "compilableText = true") as workspace:
+        holds(workspace.shell("out/lib/x64/Debug/compilable"), " checks, 0 failures\n")
+        compile_with_clang(workspace, ["compilable"], "-Wno-logical-op-parentheses -Wno-deprecated-declarations")
+        search = subprocess.run(["g++", "-xc++", "-E", "-v", "/dev/null"], capture_output=True, text=True).stderr
+        folders = re.findall(r"^ (/\S*include\S*)$", search, re.MULTILINE)
+        compile_with_clang(workspace, ["compilable"], "-w --target=x86_64-pc-windows-msvc -fms-compatibility "
+                           "-fdelayed-template-parsing " + " ".join(f"-isystem {folder}" for folder in folders))
+
+
 def test_tour(binary):
     with build(binary, TOUR / "tree", "tour.qrws") as workspace:
         equal(workspace.shell("out/lib/x64/Debug/app"), (TOUR / "expected.txt").read_text())
@@ -218,4 +230,4 @@ def test_modules(binary):
 
 
 if __name__ == "__main__":
-    run_tests([test_every_kind, test_tour, test_byte_order, test_ipc, test_threads, test_sockets, test_modules])
+    run_tests([test_every_kind, test_compilable_text, test_tour, test_byte_order, test_ipc, test_threads, test_sockets, test_modules])
