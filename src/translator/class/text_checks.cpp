@@ -38,11 +38,22 @@ void CheckModelField(QrexParser& parser, const ClassDef& def, const ModelField& 
   }
 }
 
+// Both would be templates with a parameter of one name.
+void CheckEnclosing(QrexParser& parser, const ClassDef& def) {
+  if (!def.IsMixin() && !def.m_inheritsModel) return;
+  const ClassDef* around = def.m_enclosing;
+  while (around && !around->IsMixin()) around = around->m_enclosing;
+  if (!around) return;
+  parser.WarnOfText(PrintedElement(def) + " can't stand in " + PrintedElement(*around) + ": write it ahead of that",
+                    def);
+}
+
 }  // namespace
 
 void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
   CheckModels(parser, def);
   if (!parser.WantsCompilableText()) return;
+  CheckEnclosing(parser, def);
   for (const ModelField* field : def.m_modelFields) CheckModelField(parser, def, *field);
   if (def.IsAdt() && def.IsTemplate() && !def.m_methods.empty()) {
     parser.WarnOfText(PrintedElement(def) +
