@@ -13,15 +13,22 @@ namespace qrex {
 
 namespace {
 
+// The field is written once, by a constructor: it has no Set, and Get answers a value.
+bool IsConst(TypeView type, NameSpace& root) { return WithoutDecorators(type, root).Has(kHasConst); }
+TypeView WithoutConst(TypeView type, NameSpace& root) {
+  const TypeView resolved = Resolved(type, root);
+  return resolved.Op() == kOpConst ? resolved.Inner() : type;
+}
+
 // `holder`: the class, or one of its mixins. The base that holds a mixin's field may depend on template parameters.
 void WriteFieldAccessors(TextWriter& out, const ClassDef& def, const ClassDef& holder) {
   const bool compilable = def.WantsCompilableText();
   const std::string_view self = If(compilable && &holder != &def, "this->");
+  NameSpace& root = *holder.owner.rootNameSpace;
   for (const ClassField& field : holder.m_fields) {
     if (field.kind != FieldKind::Plain) continue;
-    TypeView type = TypeView(field.type);
-    const bool isReadOnly = compilable && WithoutDecorators(type, *holder.owner.rootNameSpace).Has(kHasConst);
-    if (isReadOnly && type.WithoutMetadata().Op() == kOpConst) type = type.WithoutMetadata().Inner();
+    const bool isConst = compilable && IsConst(field.type, root);
+    const TypeView type = isConst ? WithoutConst(field.type, root) : field.type;
     auto set = [&] {
       Write(out, "void Set$name$($type$ _v) { $self$$name$ = _v; }\n", "type"_ = type, "name"_ = field.name,
             "self"_ = self);
@@ -30,7 +37,7 @@ void WriteFieldAccessors(TextWriter& out, const ClassDef& def, const ClassDef& h
       $type$ Get$name$() const { return $self$$name$; }
       $set$
     )",
-          "type"_ = type, "name"_ = field.name, "self"_ = self, "set"_ = If(!isReadOnly, set));
+          "type"_ = type, "name"_ = field.name, "self"_ = self, "set"_ = If(!isConst, set));
   }
 }
 
