@@ -13,8 +13,7 @@ namespace qrex {
 
 namespace {
 
-// The field is written once, by a constructor: it has no Set, and Get answers a value.
-bool IsConst(TypeView type, NameSpace& root) { return WithoutDecorators(type, root).Has(kHasConst); }
+// Get of a const field answers a value.
 TypeView WithoutConst(TypeView type, NameSpace& root) {
   const TypeView resolved = Resolved(type, root);
   return resolved.Op() == kOpConst ? resolved.Inner() : type;
@@ -27,7 +26,7 @@ void WriteFieldAccessors(TextWriter& out, const ClassDef& def, const ClassDef& h
   NameSpace& root = *holder.owner.rootNameSpace;
   for (const ClassField& field : holder.m_fields) {
     if (field.kind != FieldKind::Plain) continue;
-    const bool isConst = compilable && IsConst(field.type, root);
+    const bool isConst = compilable && IsConstField(field.type, root);
     const TypeView type = isConst ? WithoutConst(field.type, root) : field.type;
     auto set = [&] {
       Write(out, "void Set$name$($type$ _v) { $self$$name$ = _v; }\n", "type"_ = type, "name"_ = field.name,

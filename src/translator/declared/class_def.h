@@ -98,6 +98,7 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   std::vector<ClassDef*> m_postMixinBases;
   std::vector<FunctionSignature> m_methods;
   std::vector<ClassField> m_fields;
+  bool m_hasConstructor = false;  // its own, not a generated one
   bool m_hasEvictBlock = false;
   bool m_hasVisitBlock = false;
   std::vector<std::string> m_evictionMembers;
