@@ -64,15 +64,25 @@ void CheckConstFields(QrexParser& parser, const ClassDef& def) {
   }
 }
 
-// The generated text says the parameters again, and their names as arguments.
+// Whether generated text beside the class, or a friend in it, names the class.
+bool HasFunctionsBeside(const ClassDef& def) {
+  return def.m_reflected || def.HasEmbeddedModel() || def.m_referencedModel || !def.m_methods.empty() ||
+         def.m_hasVisitBlock || def.HasSerialise() || def.HasPrint();
+}
+
 void CheckTemplateParameters(QrexParser& parser, const ClassDef& def) {
   const std::string& list = def.m_templateArgList;
   if (list.find('=') == std::string::npos && list.find("...") == std::string::npos) return;
-  const bool isNamedAgain = !def.m_mixinBaseClass.empty() || def.m_reflected || def.HasEmbeddedModel() ||
-                            !def.m_methods.empty() || def.m_hasVisitBlock || def.HasSerialise() || def.HasPrint();
-  if (!isNamedAgain) return;
+  if (def.m_mixinBaseClass.empty() && !HasFunctionsBeside(def)) return;
   parser.WarnOfText("Template parameters of " + PrintedElement(def) + " can have no defaults and be no packs: leave " +
                         "these out, or write what needs them in a template without $",
+                    def);
+}
+
+void CheckLocal(QrexParser& parser, const ClassDef& def) {
+  if (!parser.inCodeBlock || (!def.IsMixin() && !def.IsTemplate() && !HasFunctionsBeside(def))) return;
+  parser.WarnOfText(PrintedElement(def) + " is local to a function, where neither templates nor functions can stand: " +
+                        "write it outside of the block",
                     def);
 }
 
@@ -84,6 +94,7 @@ void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
   CheckEnclosing(parser, def);
   CheckConstFields(parser, def);
   CheckTemplateParameters(parser, def);
+  CheckLocal(parser, def);
   if (def.m_hasVisitBlock && def.HasEmbeddedModel() && !def.m_inheritsModel) {
     parser.WarnOfText(PrintedElement(def) + " has both $visit and a model in its body, and each of them is " +
                           "VisitObjects: put the model into the head",
