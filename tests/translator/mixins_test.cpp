@@ -55,5 +55,40 @@ TEST_F(MixinsTest, Faults) {
   });
 }
 
+// What the archive functions of a model in a class call is declared ahead of the outermost class, where there is one.
+TEST_F(MixinsTest, ArchivesInPlace) {
+  const std::string model = " : model { int32 a; } ";
+  const std::pair<std::string, bool> cases[] = {
+      {"$struct S" + model + "{ int model; };", false},
+      {"$struct S { $model { int32 a; } };", false},
+      {"$struct S : mixin [ M ] { };\n$model Own { int32 a; };", false},
+      {"$struct S<typename T> { };\n$struct U" + model + "{ };", false},
+      {"$struct S<typename T>" + model + "{ };", true},
+      {"$struct S<typename T> { $model { int32 a; } };", true},
+      {"$struct S { int a[2] = { }; $struct In" + model + "{ }; };", true},
+      {"$struct S { $struct In { $model { int32 a; } }; };", true},
+      {"$struct S : mixin [ model { int32 a; } ] { };", true},
+      {"$mixin S" + model + "{ };", true},
+  };
+  for (const bool wanted : {true, false}) {
+    settings.compilableText = wanted;
+    for (const auto& [text, inPlace] : cases) {
+      const std::string header = TranslateHeader("$mixin M { };\nnamespace n { " + text + " }").header;
+      EXPECT_EQ(header.find("} //n\nnamespace vesk\n{\n    RSN ") != std::string::npos, wanted && inPlace) << text;
+    }
+  }
+}
+
+// Functions are friends where they stand in a class, not where it is only called nested.
+TEST_F(MixinsTest, FriendsOfNestedClasses) {
+  settings.compilableText = true;
+  const std::string text = " S <<nested>> : model { int32 a; } { $void F() {} };";
+  EXPECT_EQ(TranslateHeader("$struct" + text).header.find("friend"), std::string::npos);
+  const std::string header = TranslateHeader("$struct Outer { $struct" + text + " };").header;
+  EXPECT_NE(header.find("\nfriend inline void __stdcall F(S* _self) { _self->F(); }"), std::string::npos);
+  EXPECT_NE(header.find("template<typename Archive> friend inline void Serialise(Archive& _ar,S const& _x)"),
+            std::string::npos);
+}
+
 }  // namespace
 }  // namespace qrex

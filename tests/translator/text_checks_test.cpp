@@ -61,6 +61,28 @@ TEST_F(TextChecksTest, OneWarningForEach) {
        "a struct without fields, { } name"},
       {"$model A { int32 a; };\n$model B { int32 b; };\n$struct S <<reflect>> : mixin [ A B ] { };",
        "4) : warning W1018 : $struct S lists several models: write one that has the fields of all"},
+      {"$mixin M\n{\n    $struct In : model { int32 a; } { };\n};",
+       "4) : warning W1018 : $struct In can't stand in $mixin M: write it ahead of that"},
+      {"$struct S\n{\n    $struct In : model { int32 a; } { };\n};\n$mixin M { $struct In { $int32 a; }; };", ""},
+      {"$mixin M { $const int32 a; };\n$struct+ S : mixin [ M ] { S() : b(1) {} $const int32 b; };",
+       "3) : warning W1018 : Const field a of $mixin M gets no value: write a constructor, or leave $ out and give the "
+       "value behind the name"},
+      {"$struct+ S\n{\n    ~S() {}\n    $const int32 a[2];\n};",
+       "2) : warning W1018 : Const field a of $struct+ S gets no value: write a constructor, or leave $ out and give "
+       "the value behind the name"},
+      {"$struct+ S { $$() : a(1) {} $const int32 a; };\n$struct U { $const int32 a; };", ""},
+      {"$struct S<typename T = int> { $void F() {} };",
+       "2) : warning W1018 : Template parameters of $struct S can have no defaults and be no packs: leave these out, "
+       "or "
+       "write what needs them in a template without $"},
+      {"$struct S<typename... T> { $int32 a; };", ""},
+      {"$mixin M\n{\n    $model { int32 a; }\n    $visit { }\n};",
+       "2) : warning W1018 : $mixin M has both $visit and a model in its body, and each of them is VisitObjects: put "
+       "the model into the head"},
+      {"$struct S\n{\n    $dep int32 d calc\n    {\n        $struct L { $int32 F() { return 1; } };\n        d = 1;\n"
+       "    };\n    $struct M { $int32 F() { return 1; } };\n};",
+       "6) : warning W1018 : $struct L is local to a function, where neither templates nor functions can stand: write "
+       "it outside of the block"},
   };
   for (const auto& [text, warning] : cases) {
     AssertWarned(text, warning.empty() ? "" : "t.h(" + warning + "\n");

@@ -44,7 +44,14 @@ void CopyConstructArray(T* array, ssize_t at, T const* source, ssize_t begin, ss
 
 template <typename T>
 void AssignArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
-  for (ssize_t i = begin; i < end; ++i) array[at++] = source[i];
+  for (ssize_t i = begin; i < end; ++i, ++at) {
+    if constexpr (std::is_copy_assignable<T>::value || !std::is_copy_constructible<T>::value) {
+      array[at] = source[i];
+    } else if (array + at != source + i) {  // it has const fields
+      array[at].~T();
+      new (array + at) T(source[i]);
+    }
+  }
 }
 
 // The range that asks for the alignment of the type in place of destroying anything.

@@ -35,6 +35,12 @@ void ParseItem(QrexParser& parser, ClassDef& def, bool isPrivate) {
   parser.Advance();
 }
 
+// At a `(`, behind the name of the class: not so in its destructor.
+bool StandsBehindConstructor(const QrexParser& parser, const ClassDef& def) {
+  const TextRange name = parser.previous.text;
+  return parser.Is(kOpenParen) && (name == def.name || name == "$$") && name.begin[-1] != '~';
+}
+
 }  // namespace
 
 void ParseClassBody(QrexParser& parser, ClassDef& def) {
@@ -51,9 +57,11 @@ void ParseClassBody(QrexParser& parser, ClassDef& def) {
       parser.DropBehindCurrent();
       parser.Advance();
       parser.out << def.name;
+      def.m_hasConstructor |= depth == 1 && StandsBehindConstructor(parser, def);
       parser.Advance();
       continue;
     }
+    def.m_hasConstructor |= depth == 1 && StandsBehindConstructor(parser, def);
     if (parser.Is(kOpenBrace)) ++depth;
     if (parser.Is(kCloseBrace) && --depth == 0) return;
     if (depth == 1 && parser.Is(kColon)) {

@@ -7,19 +7,36 @@
 #include "translator/emit/emit.h"
 #include "translator/interface/interface_def.h"
 #include "translator/model/model.h"
+#include "translator/symbols/scanned_file.h"
 
 namespace qrex {
 
 namespace {
 
-void WriteFieldAccessors(TextWriter& out, const ClassDef& def) {
-  for (const ClassField& field : def.m_fields) {
+// Get of a const field answers a value.
+TypeView WithoutConst(TypeView type, NameSpace& root) {
+  const TypeView resolved = Resolved(type, root);
+  return resolved.Op() == kOpConst ? resolved.Inner() : type;
+}
+
+// `holder`: the class, or one of its mixins. The base that holds a mixin's field may depend on template parameters.
+void WriteFieldAccessors(TextWriter& out, const ClassDef& def, const ClassDef& holder) {
+  const bool compilable = def.WantsCompilableText();
+  const std::string_view self = If(compilable && &holder != &def, "this->");
+  NameSpace& root = *holder.owner.rootNameSpace;
+  for (const ClassField& field : holder.m_fields) {
     if (field.kind != FieldKind::Plain) continue;
+    const bool isConst = compilable && IsConstField(field.type, root);
+    const TypeView type = isConst ? WithoutConst(field.type, root) : field.type;
+    auto set = [&] {
+      Write(out, "void Set$name$($type$ _v) { $self$$name$ = _v; }\n", "type"_ = type, "name"_ = field.name,
+            "self"_ = self);
+    };
     Write(out, R"(
-      $type$ Get$name$() const { return $name$; }
-      void Set$name$($type$ _v) { $name$ = _v; }
+      $type$ Get$name$() const { return $self$$name$; }
+      $set$
     )",
-          "type"_ = TypeView(field.type), "name"_ = field.name);
+          "type"_ = type, "name"_ = field.name, "self"_ = self, "set"_ = If(!isConst, set));
   }
 }
 
@@ -31,6 +48,9 @@ void WriteArchiveDeclarations(TextWriter& out) {
 }
 
 void WriteArchiveMembers(TextWriter& out, const ClassDef& def) {
+  if (def.IsWholeInPlace() && (def.m_inheritsModel || def.m_referencedModel)) {
+    return WriteDataSourceRsnFunctions(out, def, Placement::InClass);
+  }
   if (!def.HasEmbeddedModel()) {
     if (def.m_referencedModel) WriteArchiveDeclarations(out);
     return;
@@ -56,8 +76,8 @@ void WriteQueries(TextWriter& out, const ClassDef& def) {
 }
 
 void WriteInterfaceMembers(TextWriter& out, const ClassDef& def, std::string_view scope) {
-  const std::string reflected =
-      def.m_reflected ? "&_GetReflected( (" + def.GetQualifiedName() + def.TemplateArgs() + "*) 0)" : "NULL";
+  const std::string name = def.IsWholeInPlace() ? def.name : def.GetQualifiedName() + def.TemplateArgs();
+  const std::string reflected = def.m_reflected ? "&_GetReflected( (" + name + "*) 0)" : "NULL";
   Write(
       out, R"(
 
@@ -87,9 +107,9 @@ void WriteInterfaceMembers(TextWriter& out, const ClassDef& def) {
 
 void WriteReflectionMembers(TextWriter& out, const ClassDef& def) {
   if (!def.m_reflected) return;
-  if (HasCreateFunction(def)) out << "static vesk::ptr<vesk::IObject> __stdcall sfnCreateInstance();\n";
+  if (HasCreateFunction(def)) WriteCreateInstanceMember(out, def);
   if (def.IsMixin()) return;
-  if (def.IsTemplate()) {
+  if (def.MemberPlacement() == Placement::InClass) {
     out << "friend ";
     return WriteGetReflected(out, def);
   }
@@ -120,8 +140,8 @@ void WriteClassMembers(TextWriter& out, const ClassDef& def) {
       "model"_ = If(!def.m_inheritsModel && def.HasEmbeddedModel(), [&] { WriteModelFieldsAndAccessors(out, def); }),
       "fieldAccessors"_ =
           [&] {
-            WriteFieldAccessors(out, def);
-            for (const ClassDef* mixin : def.m_mixins) WriteFieldAccessors(out, *mixin);
+            WriteFieldAccessors(out, def, def);
+            for (const ClassDef* mixin : def.m_mixins) WriteFieldAccessors(out, def, *mixin);
           },
       "archive"_ = [&] { WriteArchiveMembers(out, def); }, "reflection"_ = [&] { WriteReflectionMembers(out, def); },
       "interfaces"_ = [&] { WriteInterfaceMembers(out, def); });
@@ -185,15 +205,20 @@ void WriteVisitorOperators(TextWriter& out, const ClassDef& def, std::string_vie
         "prefs"_ = If(hasModel, prefs));
 }
 
-void WriteArchiveFunctions(TextWriter& out, std::string_view prefix, std::string_view name) {
-  Write(
-      out, R"(
+// Two template heads can't be those of one function: text that compiles has one with the parameters of both.
+void WriteArchiveFunctions(TextWriter& out, const ClassDef& def, std::string_view name) {
+  const bool compilable = def.WantsCompilableText();
+  const std::string parameters = def.TemplateParameters();
+  auto prefixLine = [&] { out << def.TemplatePrefix() << "\n"; };
+  Write(out, R"(
     $prefixLine$
-    template<typename Archive> inline void Serialise(Archive& _ar,$class$ const& _x) { _x.Serialise(_ar); }
+    template<typename Archive$parameters$> $friend$inline void Serialise(Archive& _ar,$class$ const& _x) { _x.Serialise(_ar); }
     $prefixLine$
-    template<typename Archive> inline void Deserialise(Archive& _ar,$class$& _x) { _x.Deserialise(_ar); }
+    template<typename Archive$parameters$> $friend$inline void Deserialise(Archive& _ar,$class$& _x) { _x.Deserialise(_ar); }
   )",
-      "prefixLine"_ = [&] { out << prefix << "\n"; }, "class"_ = name);
+        "prefixLine"_ = If(!compilable || parameters.empty(), prefixLine),
+        "parameters"_ = If(compilable && !parameters.empty(), "," + parameters), "friend"_ = def.FriendWord(),
+        "class"_ = name);
 }
 
 void WriteStreamInsertion(TextWriter& out, const ClassDef& def, std::string_view prefix, std::string_view name) {
@@ -232,11 +257,13 @@ void WriteImplementedInterfaces(TextWriter& out, const ClassDef& def) {
 
 // The functions of a method begin with the line end that would close the text ahead of them.
 void WriteForwarder(TextWriter& out, const ClassDef& def, const FunctionSignature& method) {
+  const bool compilable = def.WantsCompilableText();
   out << "\n";
   Write(
-      out, "inline $type$ __stdcall $method$($parameters$) { $return$_self->$method$($arguments$); }",
-      "type"_ = TypeView(method.returnType), "method"_ = method.name,
-      "parameters"_ = [&] { WriteSelfAndArgDeclarations(out, def.name, method); },
+      out, "$prefix$inline $type$ __stdcall $method$($parameters$) { $return$_self->$method$($arguments$); }",
+      "prefix"_ = If(compilable, def.FunctionPrefix()), "type"_ = TypeView(method.returnType), "method"_ = method.name,
+      "parameters"_ =
+          [&] { WriteSelfAndArgDeclarations(out, compilable ? def.GetTemplateClassName() : def.name, method); },
       "return"_ = If(!IsVoid(method.returnType), "return "),
       "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
 }
@@ -253,9 +280,9 @@ void WriteAdtFunction(TextWriter& out, const ClassDef& def, const FunctionSignat
 
 void WriteClassOperators(TextWriter& out, const ClassDef& def) {
   const std::string& name = def.GetTemplateClassName();
-  const std::string prefix = def.TemplatePrefix();
+  const std::string prefix = def.FunctionPrefix();
   WriteVisitorOperators(out, def, prefix, name);
-  if (def.WriteInsertionExtractionInTermsOfSerialise()) WriteArchiveFunctions(out, prefix, name);
+  if (def.WriteInsertionExtractionInTermsOfSerialise()) WriteArchiveFunctions(out, def, name);
   WriteStreamInsertion(out, def, prefix, name);
   if (def.IsAdt() && def.status == DeclStatus::Deferred) {
     WriteReflectionDeclarations(out, def);

@@ -13,6 +13,8 @@ void WriteClassOperators(TextWriter& out, const ClassDef& def);  // at name-spac
 void WriteEvictDgsNodes(TextWriter& out, const ClassDef& def);
 void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def);  // QueryInterface, GetReflectedClass out of line
 void WriteGetReflected(TextWriter& out, const ClassDef& def);
+void WriteCreateInstanceMember(TextWriter& out,
+                               const ClassDef& def);  // its declaration; whole where no tail defines it
 void WriteGetTypeOps(TextWriter& out, const ClassDef& def);
 
 void WriteForwardDeclaration(TextWriter& out, const ClassDef& def);

@@ -161,17 +161,19 @@ void ClassHead::ComposeBase() {
   const std::string& name = m_def.name;
   if (!m_rawBases.empty() && (m_haveMixinList || m_def.m_inheritsModel)) {
     m_folded = true;
-    if (m_def.IsMixin()) {
-      Write(m_out, R"(
-        template <typename BC>
-        struct $name$__BASE : BC,$bases$ {};
-      )",
-            "name"_ = name, "bases"_ = m_rawBases);
-      m_base = name + "__BASE<BC>";
-    } else {
-      Write(m_out, "struct $name$__BASE : $bases$ {};\n", "name"_ = name, "bases"_ = m_rawBases);
-      m_base = name + "__BASE";
+    // In text that compiles the raw bases may name the class's own template parameters.
+    std::string prefix(If(m_def.IsMixin(), "template <typename BC>"));
+    std::string arguments(If(m_def.IsMixin(), "<BC>"));
+    if (m_def.WantsCompilableText()) {
+      prefix = m_def.TemplatePrefix("");
+      arguments = m_def.GetTemplateClassName().substr(name.size());
     }
+    Write(m_out, R"(
+      $prefix$
+      struct $name$__BASE : $base$$bases$ {};
+    )",
+          "prefix"_ = prefix, "name"_ = name, "base"_ = If(m_def.IsMixin(), "BC,"), "bases"_ = m_rawBases);
+    m_base = name + "__BASE" + arguments;
   } else {
     m_base = m_def.IsMixin() ? "BC" : "vesk::EmptyBase";
   }

@@ -39,6 +39,7 @@ class ClassStatement {
   void CheckGeneratedOps();
   void ParseDeferred();
   void ParseDefinition();
+  bool ArchivesInPlace() const;
   void Finish();
 
   QrexParser& m_parser;
@@ -93,6 +94,7 @@ void ClassStatement::MakeElement() {
   m_def->name = m_name;
   m_def->parent = &m_parser.Current();
   m_def->m_nested = IsNested();
+  m_def->m_enclosing = m_enclosing;
   m_def->SetExported(m_exported);
   if (m_implement) m_def->m_methods = m_old->m_methods;
   if (m_parser.Is(kLess)) ReadTemplateArguments();
@@ -190,6 +192,23 @@ void ClassStatement::CheckGeneratedOps() {
   }
 }
 
+// Whether a model may come whose archive functions stand in the class: one of a template or mixin, of an entry of a
+// mixin list, or of a class inside of this one. What they call must be declared ahead of the outermost class.
+bool ClassStatement::ArchivesInPlace() const {
+  if (IsNested() || !m_def->WantsCompilableText()) return false;
+  int64_t depth = 0;
+  LexToken token = m_parser.current, previous;
+  for (LexScanner ahead = m_parser.scanner; token.kind != kEndOfText; previous = token, token = NextToken(ahead)) {
+    if (token.kind == kOpenBrace || token.kind == kOpenBracket) ++depth;
+    if (token.kind == kCloseBrace || token.kind == kCloseBracket) --depth;
+    if (token.kind == kSemicolon && depth == 0) return false;
+    if (!token.Is("model")) continue;
+    const bool isOwn = depth == 0 || (depth == 1 && previous.kind == kDollar);
+    if (!isOwn || m_def->MemberPlacement() == Placement::InClass) return true;
+  }
+  return false;
+}
+
 void ClassStatement::ParseDeferred() {
   if (m_implement) {
     m_parser.Fail("Forward declaration of " + PrintedElement(*m_def) + " incompatible with 'implements'");
@@ -273,6 +292,9 @@ void ClassStatement::Parse() {
     ParseAdt();
   } else {
     ParseInterfaces();
+    if (ArchivesInPlace()) {
+      WriteOutsideNameSpaces(m_out, m_def->parent, [&] { WriteTargetDeclarations(m_out, *m_def); });
+    }
     m_traitsWritten = ParseClassHead(m_parser, *m_def, m_final);
     CheckGeneratedOps();
     if (m_parser.Is(kSemicolon)) {

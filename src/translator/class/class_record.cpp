@@ -140,16 +140,26 @@ void ClassRecord::WriteModelFields() {
 
 void ClassRecord::WriteMethodRow(const FunctionSignature& method) {
   const std::string prefix = m_name + "_" + method.name;
-  Write(
-      m_out, R"(
-    {"$method$",{$return$},$arguments$,$metadata$,$isConst$,(vesk::FunctionPointer)($type$ (__stdcall *)($parameters$))&$scope$::$method$},
+  auto parameters = [&] { WriteSelfAndArgDeclarations(m_out, m_name, method); };
+  auto forwarder = [&] {
+    Write(
+        m_out, "[]($parameters$) -> $type$ { $return$_self->$method$($arguments$); }", "parameters"_ = parameters,
+        "type"_ = TypeView(method.returnType), "return"_ = If(!IsVoid(method.returnType), "return "),
+        "method"_ = method.name, "arguments"_ = [&] { WriteArgNames(m_out, method.arguments); });
+  };
+  auto address = [&] {
+    // The function behind a class in place is a template, or hidden in the class around: it has no address to name
+    // here.
+    if (m_def.IsWholeInPlace()) return forwarder();
+    m_out << "&" << (m_def.parent ? m_def.parent->GetQualifiedName() : std::string()) << "::" << method.name;
+  };
+  Write(m_out, R"(
+    {"$method$",{$return$},$arguments$,$metadata$,$isConst$,(vesk::FunctionPointer)($type$ (__stdcall *)($parameters$))$address$},
   )",
-      "method"_ = method.name, "return"_ = NameOrZero(!IsVoid(method.returnType), prefix + "_return"),
-      "arguments"_ = CountedName(method.arguments.size(), prefix + "_args"),
-      "metadata"_ = NameOrZero(!method.metadata.empty(), prefix + "_metadata"), "isConst"_ = BoolText(method.isConst),
-      "type"_ = TypeView(method.returnType),
-      "parameters"_ = [&] { WriteSelfAndArgDeclarations(m_out, m_name, method); },
-      "scope"_ = m_def.parent ? m_def.parent->GetQualifiedName() : std::string());
+        "method"_ = method.name, "return"_ = NameOrZero(!IsVoid(method.returnType), prefix + "_return"),
+        "arguments"_ = CountedName(method.arguments.size(), prefix + "_args"),
+        "metadata"_ = NameOrZero(!method.metadata.empty(), prefix + "_metadata"), "isConst"_ = BoolText(method.isConst),
+        "type"_ = TypeView(method.returnType), "parameters"_ = parameters, "address"_ = address);
 }
 
 void ClassRecord::WriteMethods() {
@@ -251,7 +261,7 @@ void ClassRecord::WriteFunction() {
         return $class$_class;
     }
   )",
-      "api"_ = ExportPrefix(m_def), "class"_ = m_name, "arrays"_ = [&] { WriteArrays(); },
+      "api"_ = If(!m_def.IsWholeInPlace(), ExportPrefix(m_def)), "class"_ = m_name, "arrays"_ = [&] { WriteArrays(); },
       "record"_ = [&] { WriteRecord(); });
 }
 
@@ -266,22 +276,28 @@ void ClassRecord::WriteArrays() {
   WriteInterfaces();
 }
 
-void WriteCreateInstance(TextWriter& out, const ClassDef& def) {
+// `heading`: what stands ahead of the name of the function, and what qualifies it.
+void WriteCreateInstance(TextWriter& out, const ClassDef& def, std::string_view heading, std::string_view scope) {
   auto found = std::find_if(def.m_interfaces.begin(), def.m_interfaces.end(),
                             [](const InterfaceDef* interface) { return interface->SubtypesIObject(); });
   Write(out, R"(
-    $prefix$vesk::ptr<vesk::IObject> __stdcall $class$::sfnCreateInstance()
+    $heading$vesk::ptr<vesk::IObject> __stdcall $scope$sfnCreateInstance()
     {
         return static_cast<vesk::ptr<$interface$> >(new $class$());
     }
   )",
-        "prefix"_ = def.TemplatePrefix(), "class"_ = def.GetTemplateClassName(),
+        "heading"_ = heading, "scope"_ = scope, "class"_ = def.GetTemplateClassName(),
         "interface"_ = found == def.m_interfaces.end() ? std::string() : (*found)->GetQualifiedName());
 }
 
 }  // namespace
 
 bool HasCreateFunction(const ClassDef& def) { return def.HasDefaultCtor() && def.m_implementsIObject; }
+
+void WriteCreateInstanceMember(TextWriter& out, const ClassDef& def) {
+  if (def.IsWholeInPlace()) return WriteCreateInstance(out, def, "static ", "");
+  out << "static vesk::ptr<vesk::IObject> __stdcall sfnCreateInstance();\n";
+}
 
 void WriteGetReflected(TextWriter& out, const ClassDef& def) { ClassRecord(out, def).WriteFunction(); }
 
@@ -292,18 +308,19 @@ void WriteGetTypeOps(TextWriter& out, const ClassDef& def) {
         return vesk::GetReflectedClass<$class$>().m_ops;
     }
   )",
-        "api"_ = ExportPrefix(def), "prefix"_ = def.TemplatePrefix(), "class"_ = def.GetTemplateClassName());
+        "api"_ = If(!def.IsWholeInPlace(), ExportPrefix(def)), "prefix"_ = def.FunctionPrefix(),
+        "class"_ = def.GetTemplateClassName());
 }
 
 void ClassDef::WriteReflectedDefinition(TextWriter& out) {
-  if (HasCreateFunction(*this)) WriteCreateInstance(out, *this);
+  if (HasCreateFunction(*this)) WriteCreateInstance(out, *this, TemplatePrefix(), GetTemplateClassName() + "::");
   if (MemberPlacement() == Placement::InClass) return;
   WriteGetReflected(out, *this);
   WriteGetTypeOps(out, *this);
 }
 
 void ClassDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
-  if (!HaveSomethingToRegister()) return;
+  if (!HaveSomethingToRegister() || IsWholeInPlace()) return;
   const bool isConcrete = MemberPlacement() == Placement::OutOfClass;
   WriteReflectionHead(out, *this);
   if (isConcrete) WriteModelRsnDeclarations(out, *this);
@@ -317,7 +334,7 @@ void ClassDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
       WriteSerialise(out, *this, Placement::OutOfClass);
       WriteDeserialise(out, *this, Placement::OutOfClass);
     }
-    WriteDataSourceRsnFunctions(out, *this);
+    WriteDataSourceRsnFunctions(out, *this, Placement::OutOfClass);
   }
   out << m_deferredText;
   WriteRegistration(out, *this, lists);

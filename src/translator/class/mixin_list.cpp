@@ -48,6 +48,7 @@ class MixinList {
     ClassDef& def = *made;
     def.name = m_def.name + "_Mixin_" + std::to_string(m_counter++);
     def.parent = m_def.parent;
+    def.m_enclosing = m_def.m_enclosing;
     def.status = DeclStatus::Defined;
     m_def.m_ownedElements.push_back(std::move(made));
     m_def.m_mixins.push_back(&def);

@@ -38,11 +38,68 @@ void CheckModelField(QrexParser& parser, const ClassDef& def, const ModelField& 
   }
 }
 
+// Both would be templates with a parameter of one name.
+void CheckEnclosing(QrexParser& parser, const ClassDef& def) {
+  if (!def.IsMixin() && !def.m_inheritsModel) return;
+  const ClassDef* around = def.m_enclosing;
+  while (around && !around->IsMixin()) around = around->m_enclosing;
+  if (!around) return;
+  parser.WarnOfText(PrintedElement(def) + " can't stand in " + PrintedElement(*around) + ": write it ahead of that",
+                    def);
+}
+
+// The record of the class makes objects without a value for the field.
+void CheckConstFields(QrexParser& parser, const ClassDef& def) {
+  if (!def.m_reflected || !def.HasDefaultCtor()) return;
+  std::vector<const ClassDef*> holders = {&def};
+  holders.insert(holders.end(), def.m_mixins.begin(), def.m_mixins.end());
+  for (const ClassDef* holder : holders) {
+    if (holder->m_hasConstructor) continue;
+    for (const ClassField& field : holder->m_fields) {
+      if (field.kind != FieldKind::Plain || !IsConstField(field.type, *holder->owner.rootNameSpace)) continue;
+      parser.WarnOfText("Const field " + field.name + " of " + PrintedElement(*holder) +
+                            " gets no value: write a constructor, or leave $ out and give the value behind the name",
+                        def);
+    }
+  }
+}
+
+// Whether generated text beside the class, or a friend in it, names the class.
+bool HasFunctionsBeside(const ClassDef& def) {
+  return def.m_reflected || def.HasEmbeddedModel() || def.m_referencedModel || !def.m_methods.empty() ||
+         def.m_hasVisitBlock || def.HasSerialise() || def.HasPrint();
+}
+
+void CheckTemplateParameters(QrexParser& parser, const ClassDef& def) {
+  const std::string& list = def.m_templateArgList;
+  if (list.find('=') == std::string::npos && list.find("...") == std::string::npos) return;
+  if (def.m_mixinBaseClass.empty() && !HasFunctionsBeside(def)) return;
+  parser.WarnOfText("Template parameters of " + PrintedElement(def) + " can have no defaults and be no packs: leave " +
+                        "these out, or write what needs them in a template without $",
+                    def);
+}
+
+void CheckLocal(QrexParser& parser, const ClassDef& def) {
+  if (!parser.inCodeBlock || (!def.IsMixin() && !def.IsTemplate() && !HasFunctionsBeside(def))) return;
+  parser.WarnOfText(PrintedElement(def) + " is local to a function, where neither templates nor functions can stand: " +
+                        "write it outside of the block",
+                    def);
+}
+
 }  // namespace
 
 void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
   CheckModels(parser, def);
   if (!parser.WantsCompilableText()) return;
+  CheckEnclosing(parser, def);
+  CheckConstFields(parser, def);
+  CheckTemplateParameters(parser, def);
+  CheckLocal(parser, def);
+  if (def.m_hasVisitBlock && def.HasEmbeddedModel() && !def.m_inheritsModel) {
+    parser.WarnOfText(PrintedElement(def) + " has both $visit and a model in its body, and each of them is " +
+                          "VisitObjects: put the model into the head",
+                      def);
+  }
   for (const ModelField* field : def.m_modelFields) CheckModelField(parser, def, *field);
   if (def.IsAdt() && def.IsTemplate() && !def.m_methods.empty()) {
     parser.WarnOfText(PrintedElement(def) +

@@ -62,18 +62,34 @@ bool ClassDef::ContainsMetaData() const {
                      [](const ModelField* f) { return HasMetadata(f->m_type); });
 }
 
+bool ClassDef::WantsCompilableText() const { return owner.host.Settings().compilableText; }
+
+Placement ClassDef::MemberPlacement() const {
+  const bool inClass = IsMixin() || IsTemplate() || (m_enclosing && WantsCompilableText());
+  return inClass ? Placement::InClass : Placement::OutOfClass;
+}
+
 const std::string& ClassDef::GetTemplateClassName() const {
-  if (m_templateClassName.empty()) m_templateClassName = name + TemplateArgs();
+  if (m_templateClassName.empty()) {
+    const bool namesBase = IsMixin() && WantsCompilableText();
+    m_templateClassName =
+        name + (namesBase ? IsTemplate() ? "<BC," + m_templateArgNames + ">" : "<BC>" : TemplateArgs());
+  }
   return m_templateClassName;
 }
 
 std::string ClassDef::TemplateArgs() const { return IsTemplate() ? "<" + m_templateArgNames + ">" : std::string(); }
 
-std::string ClassDef::TemplatePrefix(std::string_view behind) const {
-  if (!IsMixin() && !IsTemplate()) return {};
-  const char* const base = !IsMixin() ? "" : IsTemplate() ? "typename BC," : "typename BC";
-  return "template <" + (base + m_templateArgList + ">").append(behind);
+std::string ClassDef::TemplateParameters() const {
+  return (!IsMixin() ? "" : IsTemplate() ? "typename BC," : "typename BC") + m_templateArgList;
 }
+
+std::string ClassDef::TemplatePrefix(std::string_view behind) const {
+  const std::string parameters = TemplateParameters();
+  return parameters.empty() ? parameters : ("template <" + parameters + ">").append(behind);
+}
+
+std::string_view ClassDef::FriendWord() const { return m_enclosing && WantsCompilableText() ? "friend " : ""; }
 
 bool ClassDef::CanBeCreated() const {
   return qualifiers.abstract != TriState::On && (!IsAdt() || m_implementsIPersistable);
@@ -162,6 +178,7 @@ bool ClassDef::WriteInsertionExtractionInTermsOfSerialise() const {
 std::string ClassDef::ModelStructName() const { return IsPureModel() && !m_isAnonymous ? name : name + "_model"; }
 
 std::string ClassDef::QualifiedModelStructName() const {
+  if (m_enclosing && WantsCompilableText()) return ModelStructName();
   const std::string& qualified = GetQualifiedName();
   return qualified.substr(0, qualified.size() - name.size()) + ModelStructName();
 }

@@ -49,15 +49,22 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   bool IsPureModel() const { return kind == ClassKind::Model; }
   bool IsUnderlyingStruct() const { return kind != ClassKind::Class; }
   bool IsTemplate() const { return !m_templateArgList.empty(); }
+  bool WantsCompilableText() const;
   // Where its generated members are defined; what depends on template parameters stays in the class.
-  Placement MemberPlacement() const { return IsMixin() || IsTemplate() ? Placement::InClass : Placement::OutOfClass; }
+  Placement MemberPlacement() const;
+  // All of its text stands where the class does, as templates of C++ and members of classes need it: its functions are
+  // templates or friends, and its reflection tail is empty.
+  bool IsWholeInPlace() const { return WantsCompilableText() && MemberPlacement() == Placement::InClass; }
   bool ExternalDefinition() const { return qualifiers.extern_ == TriState::On; }
   bool WriteTraits() const { return qualifiers.traits != TriState::Off && !m_nested && !IsTemplate(); }
   std::string_view StructWord() const { return IsUnderlyingStruct() ? "struct " : "class "; }
   const std::string& GetTemplateClassName() const;  // N, or N<argument names>
   std::string TemplateArgs() const;                 // <argument names> or nothing
+  std::string TemplateParameters() const;           // "typename BC,typename T", or nothing
   // "template <...>" and what follows it; or nothing.
   std::string TemplatePrefix(std::string_view behind = " ") const;
+  std::string_view FriendWord() const;  // ahead of a function behind the class that stands in another class
+  std::string FunctionPrefix() const { return TemplatePrefix().append(FriendWord()); }
 
   // --- What it can do: each answer serves the traits, the TypeOps bits and the members alike
   bool CanBeCreated() const;
@@ -83,13 +90,15 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   std::string QualifiedModelStructName() const;  // with the enclosing name spaces
 
   ClassKind kind;
-  bool m_isAnonymous = false;  // a model without a name of its own
+  bool m_isAnonymous = false;             // a model without a name of its own
+  const ClassDef* m_enclosing = nullptr;  // the class that it stands in; m_nested may be said of others, too
   ClassQualifiers qualifiers;
   std::vector<ClassDef*> m_bases;  // plain bases that resolve to a known class
   std::vector<ClassDef*> m_mixins;
   std::vector<ClassDef*> m_postMixinBases;
   std::vector<FunctionSignature> m_methods;
   std::vector<ClassField> m_fields;
+  bool m_hasConstructor = false;  // its own, not a generated one
   bool m_hasEvictBlock = false;
   bool m_hasVisitBlock = false;
   std::vector<std::string> m_evictionMembers;

@@ -42,6 +42,13 @@ NameSpaceFrame::~NameSpaceFrame() {
   for (auto it = m_path.rbegin(); it != m_path.rend(); ++it) m_out << "} // " << (*it)->name << "\n";
 }
 
+void WriteOutsideNameSpaces(TextWriter& out, const NameSpace* innermost, const std::function<void()>& write) {
+  const std::vector<const NameSpace*> path = EnclosingNameSpaces(innermost);
+  for (auto it = path.rbegin(); it != path.rend(); ++it) out << "} //" << (*it)->name << "\n";
+  write();
+  for (const NameSpace* nameSpace : path) out << "namespace " << nameSpace->name << "\n{\n";
+}
+
 std::string ExportPrefix(const NameSpaceElement& element) {
   const Project& project = *element.owner.file.project;
   if (!element.m_exported || project.targetType != TargetType::DynamicLinkLibrary) return {};

@@ -39,6 +39,8 @@ class NameSpaceFrame {
   TextWriter& m_out;
   std::vector<const NameSpace*> m_path;  // outermost first
 };
+// Closes the open name spaces, writes, and opens them again.
+void WriteOutsideNameSpaces(TextWriter& out, const NameSpace* innermost, const std::function<void()>& write);
 std::vector<const NameSpace*> EnclosingNameSpaces(const NameSpace* innermost);  // below the root, outermost first
 
 std::string ExportPrefix(const NameSpaceElement& element);      // "P_API " for an exported element of a DLL, else ""

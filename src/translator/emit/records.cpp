@@ -81,33 +81,29 @@ void RecordedElement::WriteReflection(TextWriter& out, RegistrationLists& lists)
 }
 
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element) {
-  const std::vector<const NameSpace*> path = EnclosingNameSpaces(element.parent);
-  auto writeEnds = [&] {
-    for (auto it = path.rbegin(); it != path.rend(); ++it) out << "} //" << (*it)->name << "\n";
+  auto traits = [&] {
+    Write(
+        out, R"(
+      namespace vesk
+      {
+      template<> struct TypeTraits<$name$>
+      {
+          static const bool is_exported = $exported$;
+          static const bool is_reflected = $reflected$;
+          static const bool is_registered = $registered$;
+          static const vesk::ETypeTraitKind kind = vesk::$kind$;
+          static const bool has_metadata = $metadata$;
+      };
+      $extraTraits$
+      } // namespace vesk
+    )",
+        "name"_ = element.GetQualifiedName(), "exported"_ = BitText(element.m_exported),
+        "reflected"_ = BitText(element.m_reflected), "registered"_ = BitText(element.EffectivelyRegistered()),
+        "kind"_ = element.kindTraits.traits, "metadata"_ = BitText(element.ContainsMetaData()),
+        "extraTraits"_ = [&] { element.WriteExtraTraits(out); });
   };
-  auto writeBegin = [&](const NameSpace* nameSpace) { out << "namespace " << nameSpace->name << "\n{\n"; };
-  Write(
-      out, R"(
-
-    $ends$
-    namespace vesk
-    {
-    template<> struct TypeTraits<$name$>
-    {
-        static const bool is_exported = $exported$;
-        static const bool is_reflected = $reflected$;
-        static const bool is_registered = $registered$;
-        static const vesk::ETypeTraitKind kind = vesk::$kind$;
-        static const bool has_metadata = $metadata$;
-    };
-    $extraTraits$
-    } // namespace vesk
-    $begins$
-  )",
-      "ends"_ = writeEnds, "name"_ = element.GetQualifiedName(), "exported"_ = BitText(element.m_exported),
-      "reflected"_ = BitText(element.m_reflected), "registered"_ = BitText(element.EffectivelyRegistered()),
-      "kind"_ = element.kindTraits.traits, "metadata"_ = BitText(element.ContainsMetaData()),
-      "extraTraits"_ = [&] { element.WriteExtraTraits(out); }, "begins"_ = Each(out, path, "", writeBegin));
+  out << "\n";
+  WriteOutsideNameSpaces(out, element.parent, traits);
 }
 
 }  // namespace qrex

@@ -109,13 +109,17 @@ void WriteFieldDeclarations(TextWriter& out, const ClassDef& def) {
 void WriteStructMembers(TextWriter& out, const ClassDef& def) {
   if (!def.m_haveModelDefaultCtor) WriteDefaultConstructor(out, def);
   WriteMemberwiseConstructor(out, def);
-  if (def.CanSerialiseEmbeddedModel()) {
+  const bool inClass = def.MemberPlacement() == Placement::InClass || def.m_isAnonymous;
+  if (inClass && def.WantsCompilableText()) {
+    WriteSerialise(out, def, Placement::InClass);
+    WriteDeserialise(out, def, Placement::InClass);
+  } else if (def.CanSerialiseEmbeddedModel()) {
     Write(out, R"(
       void Serialise(vesk::Archive&) const;
       void Deserialise(vesk::InputArchive&);
     )");
   }
-  if (def.MemberPlacement() == Placement::InClass || def.m_isAnonymous) {
+  if (inClass) {
     WriteVisiting(out, def, Placement::InClass);
   } else {
     WriteVisitingDeclarations(out, def);
@@ -228,14 +232,17 @@ void WriteReads(TextWriter& out, const ClassDef& def) {
 
 void WriteDeserialise(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!def.CanSerialiseEmbeddedModel()) return;
+  const bool inClass = placement == Placement::InClass;
+  const bool isTemplate = inClass && def.WantsCompilableText();  // the archive functions of the fields may come later
   Write(
       out, R"(
-    void $scope$Deserialise(vesk::InputArchive& _ar)
+    $template$void $scope$Deserialise($archive$& _ar)
     {
         $reads$
     }
   )",
-      "scope"_ = placement == Placement::OutOfClass ? ModelScope(def) + "::" : "",
+      "template"_ = If(isTemplate, "template<typename Archive> "),
+      "scope"_ = inClass ? "" : ModelScope(def) + "::", "archive"_ = isTemplate ? "Archive" : "vesk::InputArchive",
       "reads"_ = [&] { WriteReads(out, def); });
 }
 
@@ -356,12 +363,24 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
 namespace {
 
 bool KeepsDataSourceRsn(const ClassDef& def) {
-  if (def.MemberPlacement() == Placement::InClass) return false;
+  if (def.MemberPlacement() == Placement::InClass && !def.WantsCompilableText()) return false;
   return (def.m_inheritsModel && def.CanSerialiseEmbeddedModel()) ||
          (def.m_referencedModel && def.m_referencedModel->CanSerialiseEmbeddedModel());
 }
 
 }  // namespace
+
+void WriteTargetDeclarations(TextWriter& out, const ClassDef& def) {
+  Write(out, R"(
+    namespace vesk
+    {
+        RSN $target$_GetModelRsn();
+        void $target$_WriteDataSourceRsn(Archive& ar);
+        void $target$_ReadDataSourceRsn(InputArchive& ar);
+    }
+  )",
+        "target"_ = TargetIdentifier(def));
+}
 
 void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def) {
   const std::string target = TargetIdentifier(def);
@@ -379,21 +398,22 @@ void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def) {
         "target"_ = target);
 }
 
-void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def) {
+void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def, Placement placement) {
   if (!KeepsDataSourceRsn(def)) return;
+  const bool inClass = placement == Placement::InClass;
   Write(out, R"(
-    void $name$::Serialise(vesk::Archive& _ar) const
+    void $scope$Serialise(vesk::Archive& _ar) const
     {
         vesk::$target$_WriteDataSourceRsn(_ar);
-        _model_.Serialise(_ar);
+        $self$_model_.Serialise(_ar);
     }
-    void $name$::Deserialise(vesk::InputArchive& _ar)
+    void $scope$Deserialise(vesk::InputArchive& _ar)
     {
         vesk::$target$_ReadDataSourceRsn(_ar);
-        _model_.Deserialise(_ar);
+        $self$_model_.Deserialise(_ar);
     }
   )",
-        "name"_ = def.name, "target"_ = TargetIdentifier(def));
+        "scope"_ = If(!inClass, def.name + "::"), "target"_ = TargetIdentifier(def), "self"_ = If(inClass, "this->"));
 }
 
 namespace {
@@ -425,25 +445,29 @@ void WriteInsertionList(TextWriter& out, const ClassDef& def, std::string_view p
 }  // namespace
 
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
+  const bool compilable = def.WantsCompilableText();
+  const std::string prefix = compilable ? def.FunctionPrefix() : "";
+  const std::string& name = compilable ? def.GetTemplateClassName() : def.name;
   if (def.m_referencedModel) {
     out << "\n";
     Write(out, R"(
-      inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x) { _os << _x._model_; return _os; }
+      $prefix$inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x) { _os << _x._model_; return _os; }
     )",
-          "name"_ = def.name);
+          "prefix"_ = prefix, "name"_ = name);
     return;
   }
   if (!def.IsPureModel() && !def.m_inheritsModel) return;
   const auto writeFields = def.qualifiers.multiline == TriState::On ? WriteInsertionLines : WriteInsertionList;
   Write(
       out, R"(
-    inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x)
+    $prefix$inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x)
     {
         $fields$
         return _os;
     }
   )",
-      "name"_ = def.name, "fields"_ = [&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); });
+      "prefix"_ = prefix, "name"_ = name,
+      "fields"_ = [&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); });
 }
 
 TypeView MapOrSetIn(TypeView type) {
@@ -454,18 +478,20 @@ TypeView MapOrSetIn(TypeView type) {
 
 std::vector<MixedModelField> AllModelFields(const ClassDef& def) {
   std::vector<MixedModelField> fields;
-  for (const ModelField* field : def.m_modelFields) fields.push_back({field, false});
+  for (const ModelField* field : def.m_modelFields) fields.push_back({field, def.m_inheritsModel});
   for (const ClassDef* mixin : def.m_mixins) {
-    for (const ModelField* field : mixin->m_modelFields) fields.push_back({field, true});
+    // The fields of a model in the body of a mixin are its own.
+    const bool inMember = !def.WantsCompilableText() || mixin->m_inheritsModel || mixin->IsPureModel();
+    for (const ModelField* field : mixin->m_modelFields) fields.push_back({field, inMember});
   }
   return fields;
 }
 
 size_t WriteModelFieldRows(TextWriter& out, const ClassDef& def) {
   const std::vector<MixedModelField> fields = AllModelFields(def);
-  for (const auto& [field, fromMixin] : fields) {
+  for (const auto& [field, inMember] : fields) {
     const std::string type = def.name + "_" + field->m_name;
-    const std::string path = (def.m_inheritsModel || fromMixin ? "_model_." : "") + field->m_name;
+    const std::string path = (inMember ? "_model_." : "") + field->m_name;
     Write(out, R"(
       { "$name$", $offset$, $type$, $added$, $dropped$$mapOrSet$ },
     )",

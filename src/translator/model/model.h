@@ -27,7 +27,9 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def);
 // At class level, in the reflection tail: what must be declared ahead of the class's definitions, and the two functions
 // that keep the data source's release number.
 void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def);
-void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def);
+// All that those of a class may call, where they stand in the class itself.
+void WriteTargetDeclarations(TextWriter& out, const ClassDef& def);
+void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def, Placement placement);
 
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def);  // when `os` is unset
 // Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or none.
@@ -38,7 +40,7 @@ size_t WriteModelFieldRows(TextWriter& out, const ClassDef& def);
 // The fields that those rows describe: the class's own, then those of its mixins.
 struct MixedModelField {
   const ModelField* field;
-  bool fromMixin;
+  bool inMember;  // of `_model_`
 };
 std::vector<MixedModelField> AllModelFields(const ClassDef& def);
 

@@ -1,5 +1,7 @@
 #include "translator/reader/code_block.h"
 
+#include <utility>
+
 #include "translator/declared/class_def.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -34,6 +36,7 @@ void CopyCodeBlock(QrexParser& parser, ClassDef& def) {
   NestingGuard guard(parser);
   if (!parser.Is(kOpenBrace)) parser.FailExpected("{");
   parser.DropToCurrent();
+  const bool wasInCodeBlock = std::exchange(parser.inCodeBlock, true);
   for (int64_t depth = 0;;) {
     if (parser.Is(kEndOfText)) parser.Fail("Met EOS before read matching brace");
     if (parser.Is(kDollarDollar)) {
@@ -50,6 +53,7 @@ void CopyCodeBlock(QrexParser& parser, ClassDef& def) {
     }
     parser.Advance();
   }
+  parser.inCodeBlock = wasInCodeBlock;
   parser.Advance();
   parser.CopyToCurrent();
   parser.out << "\n";

@@ -159,7 +159,8 @@ class QrexParser : public ExpressionParser {
   const KeywordTables& Keywords() const { return m_keywords; }
 
   Warnings warnings;
-  int nesting = 0;  // of declarations inside declarations, see NestingGuard
+  int nesting = 0;           // of declarations inside declarations, see NestingGuard
+  bool inCodeBlock = false;  // what is declared is local to a function
   ScannedFile& file;
   QrexParserOutputStream& stream;
   TextWriter& out;

@@ -12,6 +12,13 @@ const TypeBehaviour* BehaviourOf(TypeView type, NameSpace& root) {
 
 }  // namespace
 
+bool IsConstField(TypeView type, NameSpace& root) {
+  for (Undecorated field = WithoutDecorators(type, root);; field = WithoutDecorators(field.type.Inner(), root)) {
+    if (field.Has(kHasConst)) return true;
+    if (field.type.Op() != kOpArray) return false;
+  }
+}
+
 NameSpaceElement* NamedElement(TypeView type, NameSpace& root) { return root.LookupPath(type.Name()); }
 
 TypeView Resolved(TypeView type, NameSpace& root) {

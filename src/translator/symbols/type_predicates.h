@@ -28,6 +28,7 @@ struct Undecorated {
 Undecorated WithoutDecorators(TypeView type, NameSpace& root);
 // Behind metadata and typedefs alone; a view of the typedef's own code where there was one.
 TypeView Resolved(TypeView type, NameSpace& root);
+bool IsConstField(TypeView type, NameSpace& root);  // a field of it, or each of its elements, is never assigned
 NameSpaceElement* NamedElement(TypeView type, NameSpace& root);  // of a named type; null: it isn't declared
 
 bool IsSerialisable(TypeView type, NameSpace& root);
