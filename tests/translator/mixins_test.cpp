@@ -59,7 +59,7 @@ TEST_F(MixinsTest, Faults) {
 TEST_F(MixinsTest, ArchivesInPlace) {
   const std::string model = " : model { int32 a; } ";
   const std::pair<std::string, bool> cases[] = {
-      {"$struct S" + model + "{ int model; };", false},
+      {"$struct S" + model + "{ int other; };", false},
       {"$struct S { $model { int32 a; } };", false},
       {"$struct S : mixin [ M ] { };\n$model Own { int32 a; };", false},
       {"$struct S<typename T> { };\n$struct U" + model + "{ };", false},
