@@ -7,6 +7,7 @@
 #include "build/tools.h"
 #include "text/files.h"
 #include "text/numbers.h"
+#include "text/output_policy.h"
 #include "text/paths.h"
 #include "text/trace.h"
 #include "workspace/linker_text.h"
@@ -173,7 +174,7 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   if (linked) return true;
   HintAtUnbuiltLibraries(builder);
   ++builder.errorCount;
-  if (isGcc || IsAbnormalEnd(returnCode)) DeleteFile(target);  // half a target must not pass for a good one
+  if (isGcc || IsAbnormalEnd(returnCode)) DeleteThoughReadOnly(target);  // half a target must not pass for a good one
   return false;
 }
 

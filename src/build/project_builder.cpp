@@ -209,7 +209,7 @@ bool ProjectBuilder::LinkIfStale() {
   if (!LinkTarget(*this, target, inputs)) return false;
   if (!CompilerOf(settings.compiler).embedsManifest) return true;
   if (EmbedManifest(*this)) return true;
-  DeleteFile(target);  // a target without its manifest must not pass for a good one
+  DeleteThoughReadOnly(target);  // a target without its manifest must not pass for a good one
   return false;
 }
 

@@ -5,6 +5,7 @@
 #include "build/run_command.h"
 #include "build/tool_output.h"
 #include "text/files.h"
+#include "text/output_policy.h"
 #include "text/paths.h"
 #include "workspace/switch_blocks.h"
 
@@ -111,7 +112,7 @@ bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::str
     if (isGcc && returnCode != 0) TraceWriter() << "Return code : " << returnCode << "\n";
     ++builder.errorCount;
   }
-  if (!ran || isGcc || IsAbnormalEnd(returnCode)) DeleteFile(ObjectPath(builder, file));
+  if (!ran || isGcc || IsAbnormalEnd(returnCode)) DeleteThoughReadOnly(ObjectPath(builder, file));
   return false;
 }
 

@@ -132,9 +132,13 @@ bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly) 
   return true;
 }
 
-void DeleteReporting(const std::string& path) {
+bool DeleteThoughReadOnly(const std::string& path) {
   ChangeReadOnly(path, false);
-  if (DeleteFile(path)) TraceWriter() << "Deleting " << path << "\n";
+  return DeleteFile(path);
+}
+
+void DeleteReporting(const std::string& path) {
+  if (DeleteThoughReadOnly(path)) TraceWriter() << "Deleting " << path << "\n";
 }
 
 }  // namespace qrex

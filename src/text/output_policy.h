@@ -52,7 +52,10 @@ bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly);
 // As SetReadOnly; an existing file that refuses gets a "Failure setting/clearing read only status" line.
 void ChangeReadOnly(const std::string& path, bool readOnly);
 
-// Clears the read-only flag, deletes, and writes "Deleting " and the path when a file was deleted.
+// Clears the read-only flag and deletes; false when no file was deleted.
+bool DeleteThoughReadOnly(const std::string& path);
+
+// The same, and writes "Deleting " and the path when a file was deleted.
 void DeleteReporting(const std::string& path);
 
 }  // namespace qrex

@@ -162,6 +162,7 @@ def failing_tools_are_counted_and_the_next_run_recovers(binary):
     compilers = {
         "kill -SEGV $$": "ERROR: gcc-4 was ended by signal 11\n",
         "exit 3": "Return code : 3\n",
+        "chmod a-w \"${object%%\\\"*}\"; exit 4": "Return code : 4\n",  # what it left is read-only
         # A disk that takes no more than the first blocks of an object.
         "trap '' XFSZ; ulimit -f 1; exec gcc \"$@\"": "error",
     }
