@@ -8,17 +8,13 @@
 
 namespace qrex {
 
-void AppendWithCarriageReturns(std::string& out, std::string_view text) {
+std::string WithCarriageReturns(std::string_view text) {
+  std::string out;
+  out.reserve(text.size() + static_cast<size_t>(std::count(text.begin(), text.end(), '\n')));
   for (size_t lineFeed; (lineFeed = text.find('\n')) != std::string_view::npos; text.remove_prefix(lineFeed + 1)) {
     out.append(text.substr(0, lineFeed)).append("\r\n", 2);
   }
   out.append(text);
-}
-
-std::string WithCarriageReturns(std::string_view text) {
-  std::string out;
-  out.reserve(text.size() + text.size() / 16);
-  AppendWithCarriageReturns(out, text);
   return out;
 }
 
@@ -26,14 +22,38 @@ GeneratedFile::~GeneratedFile() {
   if (m_isSpilled) platform::RemoveFile(m_besidePath);
 }
 
-void GeneratedFile::Write(const void* data, size_t length) {
-  constexpr size_t kMostInMemory = 256 << 10;
-  std::string_view text(static_cast<const char*>(data), length);
+namespace {
+
+constexpr size_t kMostInMemory = 256 << 10;
+constexpr size_t kLongestPart = 64 << 10;  // of a line that is copied at once
+
+}  // namespace
+
+char* GeneratedFile::MakeRoom(size_t length) {
+  if (m_buffer.size() - m_used < length) {
+    if (m_used + length > kMostInMemory) Spill();
+    const size_t doubled = std::min(std::max<size_t>(2 * m_buffer.size(), 4 << 10), kMostInMemory);
+    m_buffer.resize(std::max(m_used + length, doubled), boost::container::default_init);
+  }
+  return m_buffer.data() + m_used;
+}
+
+// The one copy of the text on its way from the writer's array.
+void GeneratedFile::WriteIndented(std::string_view text, size_t blanks, bool atLineStart) {
   while (!text.empty()) {
-    const size_t piece = std::min(text.size(), kMostInMemory);
-    AppendWithCarriageReturns(m_text, text.substr(0, piece));
-    text.remove_prefix(piece);
-    if (m_text.size() >= kMostInMemory) Spill();
+    const std::string_view part = text.substr(0, kLongestPart);
+    const size_t length = std::min(part.find('\n'), part.size());
+    const bool endsLine = length < part.size();
+    char* to = MakeRoom(blanks + length + 2);
+    if (atLineStart) to = std::fill_n(to, blanks, ' ');
+    to = std::copy_n(part.data(), length, to);
+    if (endsLine) {
+      *to++ = '\r';
+      *to++ = '\n';
+    }
+    m_used = static_cast<size_t>(to - m_buffer.data());
+    text.remove_prefix(endsLine ? length + 1 : length);
+    atLineStart = endsLine;
   }
 }
 
@@ -59,13 +79,13 @@ void GeneratedFile::Spill() {
       if (!m_beside.Open(m_besidePath, FileMode::WriteBinary)) throw FileException(m_path);
       m_isSpilled = true;
     }
-    m_beside.Write(m_text.data(), m_text.size());
+    m_beside.Write(m_buffer.data(), m_used);
   });
-  m_text.clear();
+  m_used = 0;
 }
 
 std::string GeneratedFile::Text() {
-  if (!m_isSpilled && !m_failure) return m_text;
+  if (!m_isSpilled && !m_failure) return std::string(InMemory());
   Spill();
   std::string text;
   Try([&] {
@@ -77,7 +97,7 @@ std::string GeneratedFile::Text() {
 }
 
 void GeneratedFile::Commit() {
-  if (!m_isSpilled && !m_failure) return ReplaceFile(m_path, m_text, ReadOnlyTarget::Replace);
+  if (!m_isSpilled && !m_failure) return ReplaceFile(m_path, InMemory(), ReadOnlyTarget::Replace);
   Spill();
   Try([this] { m_beside.Close(); });
   RaiseFailure();

@@ -2,6 +2,7 @@
 // action has its line on the trace log.
 #pragma once
 
+#include <boost/container/vector.hpp>
 #include <optional>
 #include <string>
 
@@ -19,7 +20,6 @@ int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);  // the s
 
 // The text with each line feed as CR LF: how every generated file stands on disk.
 std::string WithCarriageReturns(std::string_view text);
-void AppendWithCarriageReturns(std::string& out, std::string_view text);
 
 // A generated file while it is composed, with CR LF line ends. It replaces the target as a whole when it is committed;
 // without that it leaves no trace. A long text goes to the file beside the target as it comes and is not kept in
@@ -28,7 +28,10 @@ class GeneratedFile : public IOutputStream {
  public:
   explicit GeneratedFile(std::string path) : m_path(std::move(path)) {}
   ~GeneratedFile() override;
-  void Write(const void* data, size_t length) override;
+  void Write(const void* data, size_t length) override {
+    WriteIndented({static_cast<const char*>(data), length}, 0, false);
+  }
+  void WriteIndented(std::string_view text, size_t blanks, bool atLineStart) override;
   void Flush() override {}
   std::string Text();  // all that was written; raises FileException
   void Commit();       // raises FileException. A read-only target is replaced like any other
@@ -39,7 +42,10 @@ class GeneratedFile : public IOutputStream {
   void Try(Step step);
   void RaiseFailure() const;
   const std::string m_path;
-  std::string m_text;
+  std::string_view InMemory() const { return {m_buffer.data(), m_used}; }
+  char* MakeRoom(size_t length);            // behind what is in memory; the length is that of a part of a line
+  boost::container::vector<char> m_buffer;  // grows without being cleared first
+  size_t m_used = 0;
   File m_beside;
   std::string m_besidePath;
   bool m_isSpilled = false;

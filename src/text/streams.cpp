@@ -11,6 +11,18 @@
 
 namespace qrex {
 
+void IOutputStream::WriteIndented(std::string_view text, size_t blanks, bool atLineStart) {
+  const std::string indentation(blanks, ' ');
+  while (!text.empty()) {
+    if (atLineStart) Write(indentation.data(), indentation.size());
+    const size_t lineFeed = text.find('\n');
+    atLineStart = lineFeed != std::string_view::npos;
+    const size_t length = atLineStart ? lineFeed + 1 : text.size();
+    Write(text.data(), length);
+    text.remove_prefix(length);
+  }
+}
+
 void PagedBuffer::SetSize(size_t size, bool shrink) {
   const size_t pages = (size + m_pageSize - 1) / m_pageSize;
   while (m_pages.size() < pages) m_pages.emplace_back(new char[m_pageSize]);  // not zeroed

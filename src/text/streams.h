@@ -6,6 +6,7 @@
 #include <cstdint>
 #include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
 namespace qrex {
@@ -15,6 +16,9 @@ class IOutputStream {
   virtual ~IOutputStream() = default;
   virtual void Write(const void* data, size_t length) = 0;
   virtual void Flush() = 0;
+  // Writes the text with blanks ahead of each byte that begins a line, as the first does if `atLineStart`. By pieces,
+  // through Write, where a stream has no quicker way.
+  virtual void WriteIndented(std::string_view text, size_t blanks, bool atLineStart);
 };
 
 // Close() closes the underlying object and destroys the stream itself: do not touch it afterwards.

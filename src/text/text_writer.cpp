@@ -58,18 +58,11 @@ class IndentingOutputStreamAsStreambuf : public std::streambuf {
   }
 
  private:
-  void Emit(std::string_view text) {
+  [[gnu::noinline]] void Emit(std::string_view text) {  // apart, so that Append stays small
     if (text.empty()) return;
     if (indent < 1) return m_target.Write(text.data(), text.size());
-    const std::string blanks(static_cast<size_t>(indent), ' ');
-    while (!text.empty()) {
-      if (atLineStart) m_target.Write(blanks.data(), blanks.size());
-      const size_t lineFeed = text.find('\n');
-      atLineStart = lineFeed != std::string_view::npos;
-      const size_t length = atLineStart ? lineFeed + 1 : text.size();
-      m_target.Write(text.data(), length);
-      text.remove_prefix(length);
-    }
+    m_target.WriteIndented(text, static_cast<size_t>(indent), atLineStart);
+    atLineStart = text.back() == '\n';
   }
 
   IOutputStream& m_target;

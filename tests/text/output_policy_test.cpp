@@ -64,6 +64,30 @@ TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
   EXPECT_FALSE(FileExists(BesidePath("folder")) || FileExists(BesidePath("flagged")));
 }
 
+// In memory, beside its place once it is long, and in lines that are longer than any buffer.
+TEST_F(OutputPolicyTest, GeneratedTextIsIndentedAndItsLinesEndOnTheWay) {
+  const size_t kLengths[] = {0, 1, 50, 4094, 4095, 4096, 5000, 64 << 10, 70000, 0, 255 << 10, 300000, 7};
+  for (size_t lines : {size_t{7}, std::size(kLengths)}) {
+    GeneratedFile generated("target");
+    std::string expected;
+    {
+      TextWriter writer(generated);
+      writer << "\nbegin\n";
+      const IndentScope indent(writer, 3);
+      for (size_t i = 0; i < lines; ++i) {
+        const std::string line(kLengths[i], static_cast<char>('a' + i));
+        writer << line << "\n";
+        expected.append("   ").append(line).append("\r\n");
+      }
+      writer << "rest";
+    }
+    expected = "\r\nbegin\r\n" + expected + "   rest";
+    EXPECT_EQ(expected, generated.Text());
+    generated.Commit();
+    EXPECT_EQ(expected, Read("target"));
+  }
+}
+
 // Beyond a limit of file sizes, as on a full disk: within the text, and in the last bytes, which only the close writes.
 TEST_F(OutputPolicyTest, WhatIsGeneratedIsCommittedWholeOrNotAtAll) {
   platform::FailWritesBeyondLimit();

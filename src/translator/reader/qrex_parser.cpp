@@ -15,11 +15,21 @@ QrexParserOutputStream::QrexParserOutputStream(IOutputStream& target, std::vecto
                                                TextRange expanded, const SourceMap& map)
     : m_target(target), m_lineTable(lineTable), m_expanded(expanded), m_map(map), m_cursor(map) {}
 
+void QrexParserOutputStream::AddLines(std::string_view text) {
+  size_t lineFeed = text.find('\n');
+  if (lineFeed == std::string_view::npos) return;
+  const char* const position = SourcePosition();
+  for (; lineFeed != std::string_view::npos; lineFeed = text.find('\n', lineFeed + 1)) m_lineTable.push_back(position);
+}
+
 void QrexParserOutputStream::Write(const void* data, size_t length) {
-  const std::string_view text(static_cast<const char*>(data), length);
-  m_lineTable.insert(m_lineTable.end(), static_cast<size_t>(std::count(text.begin(), text.end(), '\n')),
-                     SourcePosition());
+  AddLines({static_cast<const char*>(data), length});
   m_target.Write(data, length);
+}
+
+void QrexParserOutputStream::WriteIndented(std::string_view text, size_t blanks, bool atLineStart) {
+  AddLines(text);
+  m_target.WriteIndented(text, blanks, atLineStart);
 }
 
 void QrexParserOutputStream::Flush() { m_target.Flush(); }

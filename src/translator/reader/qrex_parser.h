@@ -36,12 +36,14 @@ class QrexParserOutputStream : public IOutputStream {
   QrexParserOutputStream(IOutputStream& target, std::vector<const char*>& lineTable, TextRange expanded,
                          const SourceMap& map);
   void Write(const void* data, size_t length) override;  // generated text
+  void WriteIndented(std::string_view text, size_t blanks, bool atLineStart) override;
   void Flush() override;
   void CopyRange(const char* begin, const char* end);  // source text, bypassing the indentation
   const char* SourcePosition();                        // mapped position of the last source text copied; null if none
   const char* SourcePosition(const char* expanded) const;  // mapped position of an address in the expanded text
 
  private:
+  void AddLines(std::string_view text);  // of generated text to the line table
   IOutputStream& m_target;
   std::vector<const char*>& m_lineTable;
   TextRange m_expanded;
