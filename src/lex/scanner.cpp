@@ -16,28 +16,28 @@ namespace qrex {
 
 namespace {
 
-// Operators by their first byte: alone, with `=`, doubled, doubled with `=`. kNoToken: no such form.
+// Operators by their first byte: with `=`, doubled, doubled with `=`. kNoToken: no such form.
 struct OperatorForms {
   char first;
-  int32_t alone, withAssign, doubled, doubledAssign;
+  int32_t withAssign, doubled, doubledAssign;
 };
 constexpr OperatorForms kOperators[] = {
-    {'+', kPlus, kPlusAssign, kPlusPlus, kNoToken},
-    {'<', kLess, kLessEqual, kShiftLeft, kShiftLeftAssign},
-    {'>', kGreater, kGreaterEqual, kShiftRight, kShiftRightAssign},
-    {'&', kAnd, kAndAssign, kAndAnd, kAndAndAssign},
-    {'|', kOr, kOrAssign, kOrOr, kOrOrAssign},
-    {'^', kXor, kXorAssign, kXorXor, kXorXorAssign},
-    {'-', kMinus, kMinusAssign, kMinusMinus, kMinusMinus},
-    {'*', kStar, kStarAssign, kNoToken, kNoToken},
-    {'/', kSlash, kSlashAssign, kNoToken, kNoToken},
-    {'%', kPercent, kPercentAssign, kNoToken, kNoToken},
-    {'!', kNot, kNotEqual, kNoToken, kNoToken},
-    {'=', kAssign, kEqual, kNoToken, kNoToken},
-    {'?', kQuestion, kQuestionAssign, kNoToken, kNoToken},
-    {':', kColon, kNoToken, kColonColon, kColonColon},
-    {'$', kDollar, kNoToken, kDollarDollar, kDollarDollar},
-    {'@', kAt, kNoToken, kNoToken, kNoToken},
+    {'+', kPlusAssign, kPlusPlus, kNoToken},
+    {'<', kLessEqual, kShiftLeft, kShiftLeftAssign},
+    {'>', kGreaterEqual, kShiftRight, kShiftRightAssign},
+    {'&', kAndAssign, kAndAnd, kAndAndAssign},
+    {'|', kOrAssign, kOrOr, kOrOrAssign},
+    {'^', kXorAssign, kXorXor, kXorXorAssign},
+    {'-', kMinusAssign, kMinusMinus, kMinusMinus},
+    {'*', kStarAssign, kNoToken, kNoToken},
+    {'/', kSlashAssign, kNoToken, kNoToken},
+    {'%', kPercentAssign, kNoToken, kNoToken},
+    {'!', kNotEqual, kNoToken, kNoToken},
+    {'=', kEqual, kNoToken, kNoToken},
+    {'?', kQuestionAssign, kNoToken, kNoToken},
+    {':', kNoToken, kColonColon, kColonColon},
+    {'$', kNoToken, kDollarDollar, kDollarDollar},
+    {'@', kNoToken, kNoToken, kNoToken},
 };
 
 constexpr std::array<int8_t, 128> MakeOperatorIndex() {
@@ -74,7 +74,7 @@ int32_t ScanOperator(LexScanner& scanner) {
     ++scanner.begin;
     return forms.withAssign;
   }
-  return forms.alone;
+  return OneByteToken(first);
 }
 
 // False without moving when no comment starts here.

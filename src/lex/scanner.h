@@ -26,14 +26,31 @@ inline void SkipWhiteSpace(LexScanner& scanner) {
   scanner.begin = at;
 }
 
-inline void SkipWord(LexScanner& scanner) {  // what continues an identifier
-  const ByteClasses& classes = ByteClassesOf(scanner.dialect);
-  const char* at = scanner.begin;
-  while (at < scanner.end && IsIdentifierPart(*at, classes)) ++at;
-  scanner.begin = at;
+// Behind what continues an identifier. The end of the text is asked for once for four bytes.
+inline const char* EndOfWord(const char* at, const char* end, const ByteClasses& classes) {
+  for (; end - at >= 4; at += 4) {
+    for (int i = 0; i < 4; ++i) {
+      if (!IsIdentifierPart(at[i], classes)) return at + i;
+    }
+  }
+  while (at < end && IsIdentifierPart(*at, classes)) ++at;
+  return at;
 }
 
-// Steps over what is more than a word or a single character; the scanner stands on its first byte. The token's kind.
+inline void SkipWord(LexScanner& scanner) {
+  scanner.begin = EndOfWord(scanner.begin, scanner.end, ByteClassesOf(scanner.dialect));
+}
+
+// Behind a number of digits alone, of which the first stands at `at`; null when it may have another form.
+inline const char* EndOfDigits(const char* at, const char* end) {
+  do ++at;
+  while (at < end && ByteClassOf(*at) == kDigitByte);
+  const bool isPlain = at == end || *at == ' ' || *at == '\n' || (ByteClassOf(*at) == kSingleByte && *at != '.');
+  return isPlain ? at : nullptr;
+}
+
+// Steps over what is not known by its first bytes for a word or a single character; the scanner stands on its first
+// byte. The token's kind.
 int32_t ScanLongToken(LexScanner& scanner);
 
 // The next token. White space is skipped, comments (kComment) too unless kept; kMacroComment is always returned. At the
@@ -52,12 +69,16 @@ inline void ReadTokenOf(LexScanner& scanner, LexToken& token, bool keepComments 
       const char c = *at;
       const uint8_t byteClass = ByteClassOf(c, classes);
       if (byteClass == kLetterByte) {
-        do ++at;
-        while (at < end && IsIdentifierPart(*at, classes));
+        at = EndOfWord(at + 1, end, classes);
         token.kind = kIdentifier;
-      } else if (byteClass == kSingleByte) {
+      } else if (byteClass == kSingleByte ||
+                 (byteClass == kOperatorByte && end - at >= 2 && ByteClassOf(at[1], classes) != kOperatorByte)) {
         ++at;
-        token.kind = SingleToken(c);
+        token.kind = OneByteToken(c);
+      } else if (const char* behind =
+                     byteClass == kDigitByte && dialect == Dialect::Qrex ? EndOfDigits(at, end) : nullptr) {
+        at = behind;
+        token.kind = kDecimal;
       } else {
         LexScanner rest(TextRange(at, end), dialect);
         token.kind = ScanLongToken(rest);

@@ -29,6 +29,35 @@ inline LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t c
 
 [[noreturn]] void FailAtEndOfArgument(const LexScanner& scanner, const char* begin);
 
+template <Dialect dialect, typename Visit>
+LexToken ReadArgumentOf(LexScanner& scanner, TextRange& argument, int32_t close, Visit visit) {
+  const char* const begin = scanner.begin;
+  LexScanner ahead = scanner;  // copies: they stay in registers
+  LexToken token;
+  int32_t nest = kNoToken;  // the opening bracket of the nest at hand
+  for (int64_t depth = 0;;) {
+    const char* const behind = ahead.begin;
+    ReadTokenOf<dialect>(ahead, token);
+    if (token.kind == kEndOfText) FailAtEndOfArgument(ahead, begin);
+    if (depth == 0) {
+      if (token.kind == kComma || token.kind == close) {
+        argument = TextRange(begin, behind);
+        scanner = ahead;
+        return token;
+      }
+      if (token.kind == kOpenParen || token.kind == kOpenBrace || token.kind == kOpenBracket) {
+        nest = token.kind;
+        depth = 1;
+      }
+    } else if (token.kind == nest) {
+      ++depth;
+    } else if (token.kind == nest + 1) {
+      --depth;
+    }
+    visit(token);
+  }
+}
+
 template <typename Visit>
 LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close, Visit visit) {
   SkipWhiteSpace(scanner);
@@ -41,25 +70,8 @@ LexToken ReadArgument(LexScanner& scanner, TextRange& argument, int32_t close, V
     scanner.begin = argument.end + 1;
     return NextToken(scanner);
   }
-  argument = TextRange(begin, begin);
-  int32_t nest = kNoToken;  // the opening bracket of the nest at hand
-  for (int64_t depth = 0;;) {
-    argument.end = scanner.begin;
-    const LexToken token = NextToken(scanner);
-    if (token.kind == kEndOfText) FailAtEndOfArgument(scanner, begin);
-    if (depth == 0) {
-      if (token.kind == kComma || token.kind == close) return token;
-      if (token.kind == kOpenParen || token.kind == kOpenBrace || token.kind == kOpenBracket) {
-        nest = token.kind;
-        depth = 1;
-      }
-    } else if (token.kind == nest) {
-      ++depth;
-    } else if (token.kind == nest + 1) {
-      --depth;
-    }
-    visit(token);
-  }
+  return scanner.dialect == Dialect::Cpp ? ReadArgumentOf<Dialect::Cpp>(scanner, argument, close, visit)
+                                         : ReadArgumentOf<Dialect::Qrex>(scanner, argument, close, visit);
 }
 
 }  // namespace qrex

@@ -3,9 +3,11 @@
 // printed).
 #pragma once
 
+#include <array>
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <iterator>
 #include <string>
 #include <string_view>
 
@@ -106,36 +108,21 @@ enum TokenKind : int32_t {
   kStray,  // what belongs to no token: a byte, or the rest of a line behind a quote that is not closed there
 };
 
-constexpr int32_t SingleToken(char c) {  // of the characters that are always a token of their own
-  switch (c) {
-    case '.':
-      return kDot;
-    case ',':
-      return kComma;
-    case ';':
-      return kSemicolon;
-    case '(':
-      return kOpenParen;
-    case ')':
-      return kCloseParen;
-    case '{':
-      return kOpenBrace;
-    case '}':
-      return kCloseBrace;
-    case '[':
-      return kOpenBracket;
-    case ']':
-      return kCloseBracket;
-    case '~':
-      return kTilde;
-    case '\\':
-      return kBackslash;
-    case '`':
-      return kBackquote;
-    default:
-      return kHash;
-  }
-}
+// Of each byte the kind of the token that it is by itself.
+inline constexpr auto kOneByteTokens = [] {
+  constexpr std::string_view kBytes = "<>&|^+-*/%!=?:$.,;(){}[]~@\\`#";
+  constexpr TokenKind kKinds[] = {kLess,      kGreater,    kAnd,       kOr,         kXor,         kPlus,
+                                  kMinus,     kStar,       kSlash,     kPercent,    kNot,         kAssign,
+                                  kQuestion,  kColon,      kDollar,    kDot,        kComma,       kSemicolon,
+                                  kOpenParen, kCloseParen, kOpenBrace, kCloseBrace, kOpenBracket, kCloseBracket,
+                                  kTilde,     kAt,         kBackslash, kBackquote,  kHash};
+  static_assert(kBytes.size() == std::size(kKinds));
+  std::array<int32_t, 256> kinds{};
+  for (int32_t& kind : kinds) kind = kNoToken;
+  for (size_t i = 0; i < kBytes.size(); ++i) kinds[static_cast<unsigned char>(kBytes[i])] = kKinds[i];
+  return kinds;
+}();
+inline int32_t OneByteToken(char c) { return kOneByteTokens[static_cast<unsigned char>(c)]; }
 
 struct LexToken {
   int32_t kind = kNoToken;
