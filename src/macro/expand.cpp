@@ -12,7 +12,6 @@ namespace qrex {
 
 namespace {
 
-constexpr int kMaxNesting = 1000;
 constexpr size_t kLargeText = 1u << 20;
 
 }  // namespace
@@ -27,7 +26,8 @@ void ForgetPosition(LexScannerException& exception, const std::string& text) {
 }
 
 ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
-                                   LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor)
+                                   LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor,
+                                   std::shared_ptr<const BodyWords> words)
     : m_handler(handler),
       m_frame(frame),
       m_world(frame.World()),
@@ -36,6 +36,8 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
       m_outIndent(outIndent),
       m_text(text),
       m_anchor(anchor),
+      m_words(std::move(words)),
+      m_hasLineFeeds(!m_words && !outIndent.IsNone() && text.View().find('\n') != std::string_view::npos),
       m_scanner(text, frame.FileFrame() ? frame.FileFrame()->dialect : Dialect::Qrex),
       m_tokenText(text.begin, text.begin),
       m_pendingBegin(text.begin),
@@ -45,13 +47,6 @@ ExpansionContext::ExpansionContext(ImportHandler* handler, LSFrame& frame, const
 }
 
 ExpansionContext::~ExpansionContext() { --m_world.nesting; }
-
-void ExpansionContext::CheckPart(const TextRange& text) const {
-  if (m_world.nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
-  if (m_world.nesting == 0) m_world.parts = 0;
-  if (++m_world.parts > m_world.limits.parts) throw LexScannerException("Too many macro expansions", text.begin);
-  CheckLength(text.Size());
-}
 
 void ExpansionContext::Run() {
   RunToEnd();
@@ -103,9 +98,10 @@ bool ExpansionContext::ReadPastPlainIn(LexToken& found) {
   LexScanner ahead = m_scanner;  // a copy, and the token too: they stay in registers
   LexToken token;
   const NamesInUse& names = m_world.names;
+  const bool strips = m_stripIndent > 0;
   do {
     m_settled = ahead.begin;
-    if (m_stripIndent > 0 && !ahead.AtEnd() && IsBlankByte(*ahead.begin)) {
+    if (strips && !ahead.AtEnd() && IsBlankByte(*ahead.begin)) {
       m_scanner = ahead;
       SkipToToken();
       ahead = m_scanner;
@@ -121,7 +117,23 @@ bool ExpansionContext::ReadPastPlainIn(LexToken& found) {
   return token.kind != kEndOfText;
 }
 
+bool ExpansionContext::ReadToWord(LexToken& found) {
+  const std::vector<BodyWords::Word>& words = m_words->words;
+  const size_t from = static_cast<size_t>(m_scanner.begin - m_text.begin);
+  while (m_nextWord < words.size() && words[m_nextWord].begin < from) ++m_nextWord;  // read as an argument
+  if (m_nextWord == words.size()) {
+    m_scanner.begin = m_settled = m_here = m_text.end;
+    return false;
+  }
+  const BodyWords::Word& word = words[m_nextWord++];
+  m_settled = m_here = m_text.begin + word.begin;
+  m_scanner.begin = m_here + word.size;
+  found = {word.kind, {m_here, m_scanner.begin}};
+  return true;
+}
+
 bool ExpansionContext::ReadPastPlain(LexToken& found) {
+  if (m_words && m_words->asOf == m_world.names.Changes()) return ReadToWord(found);
   return m_scanner.dialect == Dialect::Cpp ? ReadPastPlainIn<Dialect::Cpp>(found)
                                            : ReadPastPlainIn<Dialect::Qrex>(found);
 }
@@ -223,7 +235,10 @@ bool ExpansionContext::ExpandPredefined(const LexToken& name) {
 // --- Output
 
 void ExpansionContext::FlushTo(const char* position) {
-  if (m_pendingBegin < position) CopySource({m_pendingBegin, position}, m_outIndent, m_anchor);
+  if (m_pendingBegin < position) {
+    const bool mayBeginLine = m_hasLineFeeds || m_sink.AtLineStart();
+    CopySource({m_pendingBegin, position}, mayBeginLine ? m_outIndent : LineIndent(), m_anchor);
+  }
   m_pendingBegin = position;
 }
 
@@ -236,12 +251,6 @@ void ExpansionContext::CopySource(const TextRange& text, LineIndent indent, cons
 }
 
 void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
-
-void ExpansionContext::CheckLength(size_t added) const {
-  if (static_cast<int64_t>(m_sink.output.size() + added) > m_world.limits.bytes) {
-    throw LexScannerException("Expanded text is too long", m_tokenText);
-  }
-}
 
 void ExpansionContext::EmitGenerated(std::string_view text) {
   CheckLength(text.size());

@@ -20,7 +20,8 @@ class ExpansionContext {
   // `anchor`: for a text composed on the way, the source that stands for it in the map (it may end before the map and
   // before a macro that it defines). Null for source text.
   ExpansionContext(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
-                   LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor);
+                   LineIndent outIndent, ExpansionSink& sink, const TextRange* anchor,
+                   std::shared_ptr<const BodyWords> words = nullptr);
   // Expressions of directives are no text of their file: they are read in the one dialect of all expressions.
   void ReadAsExpression() { m_scanner.dialect = Dialect::Qrex; }
   ~ExpansionContext();
@@ -33,12 +34,14 @@ class ExpansionContext {
 
  private:
   friend struct Directive;
+  static constexpr int kMaxNesting = 1000;
 
   // --- Loop
   void RunToEnd();
   bool ReadPastPlain(LexToken& found);
   template <Dialect dialect>
   bool ReadPastPlainIn(LexToken& found);
+  bool ReadToWord(LexToken& found);  // the same where the words are known
   void SkipToToken();
   void ExpandIdentifier(const LexToken& token);
   void SubstituteInString(const LexToken& token);
@@ -52,8 +55,16 @@ class ExpansionContext {
   void DropTo(const char* position);
   void DropToScanner() { DropTo(m_scanner.begin); }
   void EmitGenerated(std::string_view text);
-  void CheckPart(const TextRange& text) const;
-  void CheckLength(size_t added) const;
+  void CheckPart(const TextRange& text) const {
+    if (m_world.nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
+    if (m_world.nesting == 0) m_world.parts = 0;
+    if (++m_world.parts > m_world.limits.parts) throw LexScannerException("Too many macro expansions", text.begin);
+    CheckLength(text.Size());
+  }
+  void CheckLength(size_t added) const {
+    if (static_cast<int64_t>(m_sink.output.size() + added) <= m_world.limits.bytes) return;
+    throw LexScannerException("Expanded text is too long", m_tokenText);
+  }
   LineIndent CurrentColumn() const { return m_sink.AtLineStart() ? m_outIndent : m_sink.ColumnHere(); }
   const TextRange* AnchorForTemporary() const { return m_anchor ? m_anchor : &m_tokenText; }
   void StripIndentation(int64_t width);
@@ -144,6 +155,9 @@ class ExpansionContext {
   LineIndent m_outIndent;
   const TextRange m_text;
   const TextRange* const m_anchor;
+  const std::shared_ptr<const BodyWords> m_words;  // of the text, where they are known
+  const bool m_hasLineFeeds;                       // the text; asked only where lines are indented
+  size_t m_nextWord = 0;
   LexScanner m_scanner;
   TextRange m_tokenText;         // of the last token of the loop: generated output maps to it
   const char* m_here = nullptr;  // where that token begins
@@ -154,9 +168,9 @@ class ExpansionContext {
 
 // Whether nothing can be expanded in a text of such tokens alone, as long as no new name comes up.
 inline bool IsPlainToken(const LexToken& token, const NamesInUse& names) {
+  if (token.kind == kIdentifier) return !names.MayHold(token.text.View());
+  if (token.kind >= kLess && token.kind < kAt) return true;  // operators and brackets
   switch (token.kind) {
-    case kIdentifier:
-      return !names.MayHold(token.text.View());
     case kDoubleQuoted:
       return token.text.View().find("$(") == std::string_view::npos;
     case kRawString:  // its lines are not indented

@@ -74,7 +74,7 @@ LSFrame::~LSFrame() = default;
 
 void LSFrame::AddVariable(std::unique_ptr<LSVariable> variable) {
   LSVariable& added = *variable;
-  const bool replaces = FindLocal(added.name.View()) != nullptr;
+  const bool replaces = m_fileFrame == this && FindLocal(added.name.View());  // only file frames ask
   m_variables.push_back(std::move(variable));
   m_world.names.Add(added.name.View());
   if (m_names) {

@@ -42,6 +42,19 @@ struct MacroFormal {
   bool isFunction = false;
 };
 
+// The words of a macro's body that may be names, and each `@@`, for a body that has nothing else that acts: a call
+// looks at these and copies what lies between, without scanning it again. Never changed once made.
+struct BodyWords {
+  struct Word {
+    int32_t kind;        // kIdentifier or kAt
+    size_t begin, size;  // in the body
+  };
+  uint64_t asOf;    // NamesInUse::Changes
+  Dialect dialect;  // in which the body was scanned
+  bool isComplete;  // false: the body has directives, strings or lines, and is scanned
+  std::vector<Word> words;
+};
+
 class LSMacroVariable : public LSVariable {
  public:
   VarType Kind() const override { return VarType::Macro; }
@@ -57,6 +70,9 @@ class LSMacroVariable : public LSVariable {
   // defined.
   bool HasPlainBody(const NamesInUse& names) const { return m_plainAsOf == names.Changes(); }
   void SetPlainBody(const NamesInUse& names) const { m_plainAsOf = names.Changes(); }
+  // Once the body has been asked for often enough for it to pay; else null, as for a body that must be scanned. Shared
+  // with the call, in whose course another may find them anew.
+  std::shared_ptr<const BodyWords> WordsOfBody(const NamesInUse& names, Dialect dialect) const;
 
   bool isPython = false;
   bool isNaked = false;
@@ -71,7 +87,10 @@ class LSMacroVariable : public LSVariable {
 
  private:
   static constexpr uint64_t kNever = ~uint64_t{0};
+  static constexpr int kScansAhead = 3;
   mutable uint64_t m_plainAsOf = kNever;
+  mutable int m_scans = 0;
+  mutable std::shared_ptr<const BodyWords> m_words;
 };
 
 class LSValueVariable : public LSVariable {

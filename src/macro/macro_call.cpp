@@ -7,6 +7,35 @@
 
 namespace qrex {
 
+static std::shared_ptr<const BodyWords> FindWords(const TextRange& body, const NamesInUse& names, Dialect dialect) {
+  auto found = std::make_shared<BodyWords>(BodyWords{names.Changes(), dialect, false, {}});
+  if (body.View().find('\n') != std::string_view::npos) return found;
+  try {
+    LexScanner scanner(body, dialect);
+    for (LexToken token; token.kind != kEndOfText;) {
+      ReadToken(scanner, token, true);
+      if (token.kind == kEndOfText || IsPlainToken(token, names)) continue;
+      if (token.kind == kAt ? NextToken(scanner).kind != kAt : token.kind != kIdentifier) return found;
+      found->words.push_back({token.kind, static_cast<size_t>(token.text.begin - body.begin), token.text.Size()});
+    }
+    found->isComplete = true;
+  } catch (const LexScannerException&) {  // told where the call meets it
+  }
+  return found;
+}
+
+std::shared_ptr<const BodyWords> LSMacroVariable::WordsOfBody(const NamesInUse& names, Dialect dialect) const {
+  if (m_scans < kScansAhead) {
+    ++m_scans;
+    return nullptr;
+  }
+  if (!m_words || m_words->asOf != names.Changes() || m_words->dialect != dialect) {
+    m_scans = 0;  // names that come between all calls must not cost a scan more for each
+    m_words = FindWords(body, names, dialect);
+  }
+  return m_words->isComplete ? m_words : nullptr;
+}
+
 void ExpansionContext::CallVariable(LSVariable& variable) {
   if (variable.Kind() != VarType::Macro) {
     DropToScanner();
@@ -114,7 +143,9 @@ void ExpansionContext::RunBody(const LSMacroVariable& macro, LSFrame& frame) {
 void ExpansionContext::ExpandBody(const LSMacroVariable& macro, LSFrame& frame) {
   if (macro.HasPlainBody(m_world.names)) return CopyBody(macro);
   const TextRange* anchor = macro.isTemporary ? AnchorForTemporary() : nullptr;
-  ExpansionContext body(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor);
+  const Dialect dialect = frame.FileFrame() ? frame.FileFrame()->dialect : Dialect::Qrex;
+  ExpansionContext body(nullptr, frame, macro.body, macro.stripIndent, CurrentColumn(), m_sink, anchor,
+                        macro.WordsOfBody(m_world.names, dialect));
   body.Run();
   if (body.WasPlain()) macro.SetPlainBody(m_world.names);
 }

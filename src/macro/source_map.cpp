@@ -27,15 +27,12 @@ const char* MapOutputOffset(const SourceMap& map, int64_t offset) {
   return cursor.Map(offset);
 }
 
-void SourceMap::Add(const char* source, size_t length, bool isGenerated) {
-  if (m_next == m_pageEnd) {
-    const size_t size = PageSize(m_pages.size());
-    m_pages.emplace_back(new SourceMapRun[size]);  // not zeroed
-    m_next = m_pages.back().get();
-    m_pageEnd = m_next + size;
-    platform::PreferLargePages(m_next, size * sizeof(SourceMapRun));
-  }
-  *m_next++ = SourceMapRun(source, length, isGenerated);
+void SourceMap::AddPage() {
+  const size_t size = PageSize(m_pages.size());
+  m_pages.emplace_back(new SourceMapRun[size]);  // not zeroed
+  m_next = m_pages.back().get();
+  m_pageEnd = m_next + size;
+  platform::PreferLargePages(m_next, size * sizeof(SourceMapRun));
 }
 
 void SourceMap::AddVerbatim(const char* begin, const char* end) {
@@ -138,7 +135,7 @@ void ExpansionSink::MakeRoom() {
 void ExpansionSink::AddVerbatim(const char* begin, const char* end) {
   if (begin == end) return;
   MakeRoom();
-  output.append(begin, end);
+  output.append(begin, static_cast<size_t>(end - begin));
   map.AddVerbatim(begin, end);
 }
 
@@ -147,8 +144,8 @@ bool ExpansionSink::BeginsLine(std::string_view text) const {
   return AtLineStart() || std::memchr(text.data(), '\n', text.size()) != nullptr;
 }
 
-void ExpansionSink::WriteVerbatim(const TextRange& range, LineIndent indent) {
-  if (indent.IsNone() || range.Empty() || !BeginsLine(range.View())) return AddVerbatim(range.begin, range.end);
+void ExpansionSink::WriteIndented(const TextRange& range, LineIndent indent) {
+  if (range.Empty() || !BeginsLine(range.View())) return AddVerbatim(range.begin, range.end);
   const size_t columns = indent.ColumnsIn(output);
   for (const char* line = range.begin; line < range.end;) {
     if (AtLineStart() && columns > 0) {

@@ -44,7 +44,11 @@ class SourceMap {
 
  private:
   static size_t PageSize(size_t page) { return size_t{64} << page; }
-  void Add(const char* source, size_t length, bool isGenerated);
+  void Add(const char* source, size_t length, bool isGenerated) {
+    if (m_next == m_pageEnd) AddPage();
+    *m_next++ = SourceMapRun(source, length, isGenerated);
+  }
+  [[gnu::noinline]] void AddPage();  // apart, so that Add needs few registers
   std::vector<std::unique_ptr<SourceMapRun[]>> m_pages;
   SourceMapRun* m_next = nullptr;
   SourceMapRun* m_pageEnd = nullptr;
@@ -95,7 +99,10 @@ class LineIndent {
 // The sink of an expansion. Each line that begins in what is written gets the indent's blanks ahead of it.
 class ExpansionSink {
  public:
-  void WriteVerbatim(const TextRange& range, LineIndent indent);
+  void WriteVerbatim(const TextRange& range, LineIndent indent) {
+    if (indent.IsNone()) return AddVerbatim(range.begin, range.end);
+    WriteIndented(range, indent);
+  }
   void WriteGenerated(std::string_view text, const char* source, LineIndent indent);
   bool AtLineStart() const { return output.empty() || output.back() == '\n'; }
   LineIndent ColumnHere() const { return LineIndent::AtOffset(output.size()); }
@@ -108,6 +115,7 @@ class ExpansionSink {
   void MakeRoom();
   bool BeginsLine(std::string_view text) const;
   void AddVerbatim(const char* begin, const char* end);
+  void WriteIndented(const TextRange& range, LineIndent indent);
 };
 
 }  // namespace qrex

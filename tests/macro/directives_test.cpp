@@ -54,6 +54,33 @@ TEST_F(DirectivesTest, Calls) {
   });
 }
 
+// After some calls a body isn't scanned any more.
+TEST_F(DirectivesTest, BodiesThatAreCalledOften) {
+  constexpr int kCalls = 12;
+  const struct {
+    const char *definitions, *call, *expected;
+  } kCases[] = {
+      {"@def m(x, y) = x(y) 'x' y1 x@@y @ @ /* x */ \"x\" x", "m(a, b)", "a(b) 'x' y1 ab  /* x */ \"x\" a"},
+      {"@def g(x) = <x>\n@def m(f(), v) = f(v) g(v) (v", "m(g, 1)", "<1> <1> (1"},
+      {"@def g(x) = <x>\n@def m(v) = v g(g(v) `v`) v", "m(g(1))m(2)", "<1> <<<1>> `<1>`> <1>2 <<2> `2`> 2"},
+      {"@nakeddef t(w) = { @def z = w\n}\n@def m(v) = <t(v) z>", "m(1)", "< 1>"},  // a name that comes on the way
+  };
+  for (const auto& [definitions, call, expected] : kCases) {
+    std::string input = std::string(definitions) + "\n", all;
+    for (int i = 0; i < kCalls; ++i) {
+      input += call;
+      all += expected;
+    }
+    EXPECT_EQ(all, ExpandAfresh(input)) << definitions;
+  }
+  AssertExpand({
+      {"@def m(x) = <x x>\nm(1)m(2)m(3)m(4)m(5)m(6)m(7)m(8)m(9)m(@def q = 1\nm(@def r = 2\nm(6)))",
+       "<1 1><2 2><3 3><4 4><5 5><6 6><7 7><8 8><9 9><<<6 6> <6 6>> <<6 6> <6 6>>>"},
+      {"@def m(x) = x late\nm(1)m(2)m(3)m(4)m(5)m(6)m(7)m(8)@def late = L\nm(9)m(0)",
+       "1 late2 late3 late4 late5 late6 late7 late8 late9 L0 L"},
+  });
+}
+
 TEST_F(DirectivesTest, LayoutOfBodies) {
   AssertExpand({
       {"@def f(x) =\n{\n    first x\n      second\n\n    last\n}\n  <f(1)>\n",

@@ -85,15 +85,21 @@ void QrexParser::CopyTo(const char* position) {
 void QrexParser::Translate() {
   const FileKind kind = file.file.kind;
   const bool checksIncludes = kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H;
-  const auto isActedOn = [checksIncludes](const LexToken& token) {
+  // Braces within others are counted in passing.
+  const auto isActedOn = [this, checksIncludes](const LexToken& token) {
     switch (token.kind) {
       case kIdentifier:
         return (*token.text.begin == 'u' && token.Is("using")) || (*token.text.begin == 'n' && token.Is("namespace"));
       case kHash:
         return checksIncludes;
-      case kAt:
       case kOpenBrace:
+        ++m_braceDepth;
+        return false;
       case kCloseBrace:
+        if (m_braceDepth < 2) return true;
+        --m_braceDepth;
+        return false;
+      case kAt:
       case kDollar:
       case kEndOfText:
         return true;
