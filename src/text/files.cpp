@@ -47,11 +47,13 @@ bool FileExists(const std::string& path) { return platform::CanRead(Checked(path
 bool FileLookup::Exists(const std::string& path) {
   const size_t slash = path.rfind('/');
   const size_t nameBegin = slash == std::string::npos ? 0 : slash + 1;
-  const auto [files, isNew] = m_plainFiles.try_emplace(path.substr(0, nameBegin));
-  if (isNew) {
+  const std::string_view folder(path.data(), nameBegin);
+  auto files = m_plainFiles.find(folder);
+  if (files == m_plainFiles.end()) {
+    files = m_plainFiles.try_emplace(std::string(folder)).first;
     for (std::string& name : platform::PlainFileNames(Checked(files->first))) files->second.insert(std::move(name));
   }
-  return files->second.contains(path.substr(nameBegin)) || FileExists(path);
+  return files->second.contains(std::string_view(path).substr(nameBegin)) || FileExists(path);
 }
 
 bool DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }

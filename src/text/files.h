@@ -27,7 +27,11 @@ class FileLookup {
   bool Exists(const std::string& path);
 
  private:
-  std::unordered_map<std::string, std::unordered_set<std::string>> m_plainFiles;  // by directory
+  struct Hash : std::hash<std::string_view> {
+    using is_transparent = void;
+  };
+  using Names = std::unordered_set<std::string, Hash, std::equal_to<>>;
+  std::unordered_map<std::string, Names, Hash, std::equal_to<>> m_plainFiles;  // by directory
 };
 bool DeleteFile(const std::string& path);
 // A program stays executable; a read-only target is replaced like any other.
