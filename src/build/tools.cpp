@@ -46,7 +46,8 @@ std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
   const std::string_view extension = IsGccFamily(builder.settings.compiler) ? ".o" : ".obj";
   std::string path;
   path.reserve(builder.IntermediateDirectory().size() + 1 + file.stem.size() + extension.size());
-  return path.append(builder.IntermediateDirectory()).append("/").append(file.stem).append(extension);
+  path.append(builder.IntermediateDirectory()).append("/").append(file.stem).append(extension);
+  return path;
 }
 
 std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {

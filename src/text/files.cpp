@@ -51,7 +51,9 @@ bool FileLookup::Exists(const std::string& path) {
   auto files = m_plainFiles.find(folder);
   if (files == m_plainFiles.end()) {
     files = m_plainFiles.try_emplace(std::string(folder)).first;
-    for (std::string& name : platform::PlainFileNames(Checked(files->first))) files->second.insert(std::move(name));
+    std::vector<std::string> names = platform::PlainFileNames(Checked(files->first));
+    files->second.reserve(names.size());
+    for (std::string& name : names) files->second.insert(std::move(name));
   }
   return files->second.contains(std::string_view(path).substr(nameBegin)) || FileExists(path);
 }

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <filesystem>
+#include <utility>
 
 namespace qrex {
 
@@ -65,7 +66,9 @@ bool HasExtension(std::string_view path, std::string_view extension) {
 bool ReplaceExtension(std::string_view path, std::string_view extension, std::string& out) {
   const size_t dot = path.rfind('.');
   if (dot == std::string_view::npos) return false;
-  out = std::string(path.substr(0, dot + 1)).append(extension);
+  std::string replaced(path.substr(0, dot + 1));  // the path may be a view of `out`
+  replaced.append(extension);
+  out = std::move(replaced);
   return true;
 }
 
@@ -82,7 +85,8 @@ std::string PathJoin(std::string_view left, std::string_view right) {
   }
   std::string joined;
   joined.reserve(left.size() + 1 + right.size());
-  return joined.append(left).append("/").append(right);
+  joined.append(left).append("/").append(right);
+  return joined;
 }
 
 std::string PathJoin3(std::string_view a, std::string_view b, std::string_view c) {

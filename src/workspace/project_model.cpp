@@ -97,6 +97,8 @@ void Project::CollectFiles() {
   AddFoldersOf(rootFolder, folders);
 
   std::unordered_map<std::string_view, ProjectFile*> sourcesByStem;
+  sourcesByStem.reserve(filesByPath.size());
+  filesByName.reserve(filesByPath.size());
   std::vector<ProjectFile*> creators, sources, assembler;  // creators: the last one met comes first
   ProjectFile* main = nullptr;
   files.clear();
