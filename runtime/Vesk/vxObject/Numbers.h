@@ -27,13 +27,13 @@ struct WrittenObjects {
   bool m_isWriting = false;  // who set it writes the contents
 };
 
-struct ReadObject {
+struct NumberedObject {
   void* m_self = nullptr;
   AnyInterface m_persistable;  // of an IPersistable object
   std::type_info const* m_type = nullptr;
-  void (*m_read)(InputArchive&, ReadObject const&) = nullptr;  // its content
-  void (*m_forget)(ReadObject const&) = nullptr;               // clears its references
-  void (*m_destroy)(ReadObject const&) = nullptr;
+  void (*m_read)(InputArchive&, NumberedObject const&) = nullptr;  // its content
+  void (*m_forget)(NumberedObject const&) = nullptr;               // clears its references
+  void (*m_destroy)(NumberedObject const&) = nullptr;
   bool m_isRead = false;
 };
 
@@ -49,7 +49,7 @@ struct ReadObjects {
   // follows one meets nothing that is gone.
   void Destroy(std::size_t first = 0);
 
-  xvector<ReadObject> m_list;
+  xvector<NumberedObject> m_list;
   std::size_t m_next = 0;    // the first object whose content may have to be read
   bool m_isReading = false;  // who set it reads the contents
   // Asked before what the archive names is made; empty: all that fit.

@@ -75,7 +75,7 @@ EMention ReadMention(InputArchive& ar, std::size_t& number);
 // The content of the object at this position, unless it was read.
 void ReadContent(InputArchive& ar, std::size_t position);
 
-// Reads a number and what must follow it. Make: ReadObject(), of an object that the archive begins. Answers its
+// Reads a number and what must follow it. Make: NumberedObject(), of an object that the archive begins. Answers its
 // position, -1 for null.
 template <typename Make>
 ssize_t ReadReference(InputArchive& ar, Make make) {
@@ -108,7 +108,7 @@ bool ListsInterface(ReflectedClass const& record, ConstStringZ name);
 
 // Makes an object of the class that the archive names. `fits`: whether a class is what the reference asks for.
 template <typename Fits>
-ReadObject MakePersistable(InputArchive& ar, Fits fits) {
+NumberedObject MakePersistable(InputArchive& ar, Fits fits) {
   xstring name;
   ar >> name;
   ReflectedClass const* record = Find<ReflectedClass>(name);
@@ -119,34 +119,34 @@ ReadObject MakePersistable(InputArchive& ar, Fits fits) {
   if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
   const ptr<IPersistable> made = QueryInterface<IPersistable>(record->m_create());
   if (!made) throw ArchiveError("not persistable: " + name);
-  ReadObject object;
+  NumberedObject object;
   object.m_self = made.Object();
   object.m_persistable = made.Any();
   object.m_type = &typeid(void);
-  object.m_read = [](InputArchive& input, ReadObject const& o) {
+  object.m_read = [](InputArchive& input, NumberedObject const& o) {
     ptr<IPersistable>(o.m_persistable)->Deserialise(input);
   };
-  object.m_forget = [](ReadObject const& o) {
+  object.m_forget = [](NumberedObject const& o) {
     ReferenceCleaner cleaner;
     ptr<IPersistable>(o.m_persistable)->VisitPrefs(cleaner);
   };
-  object.m_destroy = [](ReadObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
+  object.m_destroy = [](NumberedObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
   return object;
 }
 
 template <typename C>
-ReadObject MakeStruct() {
-  ReadObject object;
+NumberedObject MakeStruct() {
+  NumberedObject object;
   object.m_self = new C();
   object.m_type = &typeid(C);
-  object.m_read = [](InputArchive& input, ReadObject const& o) {
+  object.m_read = [](InputArchive& input, NumberedObject const& o) {
     DeserialiseArray(input, static_cast<C*>(o.m_self), 0, 1);
   };
-  object.m_forget = [](ReadObject const& o) {
+  object.m_forget = [](NumberedObject const& o) {
     ReferenceCleaner cleaner;
     static_cast<IPrefVisitor&>(cleaner) << *static_cast<C const*>(o.m_self);
   };
-  object.m_destroy = [](ReadObject const& o) { delete static_cast<C*>(o.m_self); };
+  object.m_destroy = [](NumberedObject const& o) { delete static_cast<C*>(o.m_self); };
   return object;
 }
 
