@@ -4,6 +4,7 @@
 
 #include "translator/emit/emit.h"
 #include "translator/kinds/variant_def.h"
+#include "translator/symbols/scanned_file.h"
 
 namespace qrex {
 
@@ -30,22 +31,29 @@ void WriteStreamWrite(TextWriter& out, const VariantItem& item) {
         "name"_ = item.name, "fields"_ = Each(out, item.fields, " << ','", writeField));
 }
 
-void WriteArchives(TextWriter& out, const VariantItem& item) {
+void WriteArchives(TextWriter& out, const VariantItem& item, bool isEmpty) {
   auto writeOut = [&](const ClassField& field) { out << " << " << field.name; };
   auto writeIn = [&](const ClassField& field) { out << " >> " << field.name; };
   Write(out, R"(
-    template<typename Archive> void Serialise(Archive& _ar) const { _ar$out$; }
-    template<typename Archive> void Deserialise(Archive& _ar) { _ar$in$; }
+    template<typename Archive> void Serialise(Archive& _ar) const { $archive$$out$; }
+    template<typename Archive> void Deserialise(Archive& _ar) { $archive$$in$; }
   )",
-        "out"_ = Each(out, item.fields, "", writeOut), "in"_ = Each(out, item.fields, "", writeIn));
+        "archive"_ = isEmpty ? "(void)_ar" : "_ar", "out"_ = Each(out, item.fields, "", writeOut),
+        "in"_ = Each(out, item.fields, "", writeIn));
 }
 
 // `scope`: the variant and "::" in the out-of-class form.
 void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item, std::string_view scope) {
+  const bool isEmpty = item.fields.empty() && def.WantsCompilableText();  // all its values are equal
   auto writeParameter = [&](const ClassField& field) {
     Write(out, "$type$ const& $name$_", "type"_ = TypeView(field.type), "name"_ = field.name);
   };
   auto writeInitialiser = [&](const ClassField& field) { Write(out, "$name$($name$_)", "name"_ = field.name); };
+  auto writeMemberwise = [&] {
+    Write(out, "$name$($parameters$) : $initialisers$ {}\n", "name"_ = item.name,
+          "parameters"_ = Each(out, item.fields, ",", writeParameter),
+          "initialisers"_ = Each(out, item.fields, ",", writeInitialiser));
+  };
   auto writeEquality = [&](const ClassField& field) { Write(out, " && $name$ == _rhs.$name$", "name"_ = field.name); };
   auto writeField = [&](const ClassField& field) {
     PrintDeclaration(out, field.type, field.name, DeclarationMode::Plain);
@@ -53,14 +61,14 @@ void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item
   };
   auto writeOperations = [&] {
     if (def.WritesToStream()) WriteStreamWrite(out, item);
-    if (def.HasSerialise()) WriteArchives(out, item);
+    if (def.HasSerialise()) WriteArchives(out, item, isEmpty);
   };
   Write(out, R"(
     struct $scope$$name$
     {
         enum { tag=$tag$ };
         $name$() {}
-        $name$($parameters$) : $initialisers$ {}
+        $memberwise$
         bool operator==($name$ const& _rhs) const { return true$equalities$; }
         bool operator<($name$ const& _rhs) const { return $less$; }
         $operations$
@@ -68,10 +76,8 @@ void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item
         $fields$
     };
   )",
-        "scope"_ = scope, "name"_ = item.name, "tag"_ = item.tag,
-        "parameters"_ = Each(out, item.fields, ",", writeParameter),
-        "initialisers"_ = Each(out, item.fields, ",", writeInitialiser),
-        "equalities"_ = Each(out, item.fields, "", writeEquality), "less"_ = LessText(item.fields),
+        "scope"_ = scope, "name"_ = item.name, "tag"_ = item.tag, "memberwise"_ = If(!isEmpty, writeMemberwise),
+        "equalities"_ = Each(out, item.fields, "", writeEquality), "less"_ = isEmpty ? "false" : LessText(item.fields),
         "operations"_ = writeOperations, "fields"_ = Each(out, item.fields, "", writeField));
 }
 
@@ -223,10 +229,19 @@ namespace {
 
 enum class Operation { Copy, Destroy, Equal, Less, Print, VisitObjects, VisitPrefs, Serialise, Deserialise };
 
-std::string DestructionText(const VariantItem& item, const std::string& value) {
+// Under compilableText. An enumeration has no destructor, and C++ may name a scalar in several words or a typedef.
+std::string NamedDestructionText(const VariantDef& def, const VariantItem& item, const std::string& value) {
+  const TypeView type = WithoutDecorators(item.type, *def.owner.rootNameSpace).type;
+  if (type.IsScalar() || type.Op() == kOpEnum || type.Op() == kOpPointer) return {};
+  return "{ typedef " + item.typeText + " _Item; " + value + ".~_Item(); }";
+}
+
+std::string DestructionText(const VariantDef& def, const VariantItem& item, const std::string& value) {
   const std::string& name = item.EffectiveName();
+  const bool compilable = def.WantsCompilableText();
   if (item.onHeap) return "delete *(" + name + "**)_data;";
-  if (item.isStruct) return "(*(" + name + "**)_data)->~" + name + "();";
+  if (item.isStruct) return compilable ? value + ".~" + name + "();" : "(*(" + name + "**)_data)->~" + name + "();";
+  if (compilable && TypeView(item.type).WithoutMetadata().IsNamed()) return NamedDestructionText(def, item, value);
   const std::string destructor = QualifiedDestructorText(item.type);
   return destructor.empty() ? "" : value + "." + destructor + "();";
 }
@@ -247,7 +262,7 @@ std::string StatementOf(Operation operation, const VariantDef& def, const Varian
     case Operation::Copy:
       return item.isVoid ? "" : ConstructionText(item, name) + "(_rhs." + value + ");";
     case Operation::Destroy:
-      return DestructionText(item, value);
+      return DestructionText(def, item, value);
     case Operation::Equal:
       return item.isVoid ? "" : "return " + value + " == _rhs." + value + ";";
     case Operation::Less:
