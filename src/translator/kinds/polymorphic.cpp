@@ -67,6 +67,7 @@ class Dispatch {
           WriteCall();
         } else {
           WriteLevel(depth + 1);
+          if (m_isVoid && m_def.WantsCompilableText()) m_out << "    break;\n";  // a call does not return from here
         }
       }
     };
