@@ -8,7 +8,7 @@ namespace whole_fields
 $struct Point { int32 x; };
 inline bool operator==(Point const& a, Point const& b) { return a.x == b.x; }
 inline bool operator<(Point const& a, Point const& b) { return a.x < b.x; }
-$model Part { int32 a; string8 name; int32 marks[2]; };
+$model+ Part { int32 a; string8 name; int32 marks[2]; };
 $class+ Doc isa vesk::IObject : model
 {
     int32 fixed[3];
