@@ -59,6 +59,16 @@ TEST_F(TextChecksTest, OneWarningForEach) {
       {"$variant V { void none; int32; };\n$polymorphic void F([V v]);",
        "3) : warning W1018 : Polymorphic argument v may be void, which no overload takes: give the item of $variant V "
        "a struct without fields, { } name"},
+      {"$struct S\n{\n    $variant V <<reflect>> { void; int32; };\n};",
+       "4) : warning W1018 : $variant V stands in a class, which has no place for a record: declare it in the name "
+       "space, or leave <<reflect>> out"},
+      {"$struct S\n{\n    $functor <<reflect>> void F();\n};",
+       "4) : warning W1018 : $functor F stands in a class, which has no place for a record: declare it in the name "
+       "space, or leave <<reflect>> out"},
+      {"$struct S\n{\n    $variant V { void; *{ V v; } node; };\n};",
+       "4) : warning W1018 : Item node of $variant V has a value of it, and is complete before it: declare it in the "
+       "name space"},
+      {"$struct S\n{\n    $variant V { void; *{ xvector<V> v; } node; };\n    $functor void F();\n};", ""},
       {"$model A { int32 a; };\n$model B { int32 b; };\n$struct S <<reflect>> : mixin [ A B ] { };",
        "4) : warning W1018 : $struct S lists several models: write one that has the fields of all"},
       {"$mixin M\n{\n    $struct In : model { int32 a; } { };\n};",

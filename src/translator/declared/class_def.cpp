@@ -62,8 +62,6 @@ bool ClassDef::ContainsMetaData() const {
                      [](const ModelField* f) { return HasMetadata(f->m_type); });
 }
 
-bool ClassDef::WantsCompilableText() const { return owner.host.Settings().compilableText; }
-
 Placement ClassDef::MemberPlacement() const {
   const bool inClass = IsMixin() || IsTemplate() || (m_enclosing && WantsCompilableText());
   return inClass ? Placement::InClass : Placement::OutOfClass;

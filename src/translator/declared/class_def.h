@@ -49,7 +49,6 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   bool IsPureModel() const { return kind == ClassKind::Model; }
   bool IsUnderlyingStruct() const { return kind != ClassKind::Class; }
   bool IsTemplate() const { return !m_templateArgList.empty(); }
-  bool WantsCompilableText() const;
   // Where its generated members are defined; what depends on template parameters stays in the class.
   Placement MemberPlacement() const;
   // All of its text stands where the class does, as templates of C++ and members of classes need it: its functions are

@@ -117,10 +117,19 @@ void WriteTables(TextWriter& out, const InterfaceDef& interface) {
       "table"_ = [&] { WriteTable(out, interface); });
 }
 
+// Vectors and classes are reached part by part instead.
+bool HasGetter(TypeView type, NameSpace& root) {
+  for (type = Resolved(type, root); type.Op() == kOpConst;) type = Resolved(type.Inner(), root);
+  return type.Op() != kOpClass && type.Op() != kOpVector;
+}
+
 // An attribute has no storage: its struct stands in place of the object's address and calls the methods.
 void WriteAttributes(TextWriter& out, const InterfaceDef& interface) {
+  NameSpace& root = *interface.owner.rootNameSpace;
+  const bool isWhole = interface.WantsCompilableText();  // no methods but Get and Set stand for a value
   for (const AttributeDef& attribute : interface.m_attributes) {
-    AttributeWriter writer(out, *interface.owner.rootNameSpace, Access::Methods);
+    if (isWhole && !HasGetter(attribute.type, root)) continue;
+    AttributeWriter writer(out, root, isWhole ? Access::GetAndSet : Access::Methods);
     writer.WriteStruct(interface.name, attribute.type, attribute.name, attribute.name, attribute.name, false);
   }
 }

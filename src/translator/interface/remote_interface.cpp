@@ -176,25 +176,26 @@ void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
     if (ComesBack(arg)) m_out << " << " << arg.name;
   };
   auto results = [&] { Write(m_out, "Push()$results$;\n", "results"_ = Each(m_out, method.arguments, "", result)); };
+  const bool isReference = !m_interface.m_isRmi && m_interface.WantsCompilableText();  // as a scion's Invoke answers
   Write(
       m_out, R"(
     void Thunk$index$()
     {
         $incoming$
-        Invoke()->$method$($arguments$);
+        Invoke()$access$$method$($arguments$);
         $results$
     }
   )",
-      "index"_ = index, "incoming"_ = [&] { WriteIncoming(method); }, "method"_ = method.name,
-      "arguments"_ = Each(m_out, method.arguments, ",", argument), "results"_ = If(CountResults(method) > 0, results));
+      "index"_ = index, "incoming"_ = [&] { WriteIncoming(method); }, "access"_ = isReference ? "." : "->",
+      "method"_ = method.name, "arguments"_ = Each(m_out, method.arguments, ",", argument),
+      "results"_ = If(CountResults(method) > 0, results));
 }
 
 // The parameters as variables, and the values that came with the call.
 void RemoteText::WriteIncoming(const FunctionSignature& method) {
-  if (method.arguments.empty()) {
-    m_out << "Pop();\n";
-    return;
-  }
+  const auto& arguments = method.arguments;
+  const bool nothingComes = std::all_of(arguments.begin(), arguments.end(),
+                                        [](const FunctionArg& arg) { return arg.direction == ArgDirection::Out; });
   auto variable = [&](const FunctionArg& arg) {
     const TypeView type = WithoutLeading(arg.type, {kOpReference, kOpConst});
     if (arg.direction == ArgDirection::Copy) {
@@ -206,8 +207,10 @@ void RemoteText::WriteIncoming(const FunctionSignature& method) {
   Write(
       m_out, R"(
     $variables$
-    auto _ar = Pop(); _ar$values$;
+    $pop$$values$;
   )",
+      "pop"_ =
+          arguments.empty() || (nothingComes && m_interface.WantsCompilableText()) ? "Pop()" : "auto _ar = Pop(); _ar",
       "variables"_ = Each(m_out, method.arguments, "", variable), "values"_ = [&] { WriteOutgoing(method, " >> "); });
 }
 

@@ -42,9 +42,10 @@ void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
         void* m_self;
         STUB_FN m_stubFn;
     };
-    inline vesk::xostream& operator<<(vesk::xostream& os, $name$ f) { f.write(os); return os; }
+    $friend$inline vesk::xostream& operator<<(vesk::xostream& os, $name$ f) { f.write(os); return os; }
   )",
-      "name"_ = def.name, "stub"_ = [&] { WriteSelfSignature(out, signature, "(__stdcall *STUB_FN)"); },
+      "friend"_ = If(def.m_nested && def.WantsCompilableText(), "friend "), "name"_ = def.name,
+      "stub"_ = [&] { WriteSelfSignature(out, signature, "(__stdcall *STUB_FN)"); },
       "call"_ = [&] { WriteSignature(out, call); }, "return"_ = [&] { WriteReturn(out, signature.returnType); },
       "comma"_ = signature.arguments.empty() ? "" : ",",
       "arguments"_ = [&] { WriteArgNames(out, signature.arguments); });

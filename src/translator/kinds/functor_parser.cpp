@@ -4,6 +4,7 @@
 #include "translator/emit/records.h"
 #include "translator/kinds/functor_def.h"
 #include "translator/kinds/functor_emission.h"
+#include "translator/kinds/type_registration.h"
 #include "translator/reader/qrex_parser.h"
 
 namespace qrex {
@@ -33,6 +34,7 @@ void ParseFunctor(QrexParser& parser, bool nested) {
   parser.Flush();
   parser.CheckReferences(def);
   parser.CheckMetadata(def);
+  if (def.m_nested && def.m_reflected) CheckNestedRecord(parser, def);
 }
 
 // --- Instances

@@ -168,7 +168,18 @@ struct Declaration {
 
   // "T name" without the array suffixes: the source's own are copied.
   void WriteTo(QrexParser& parser, std::string_view prefix) const {
-    parser.out << prefix << TypeText(std::string_view(parsed.type).substr(parsed.suffixSize)) << " " << parsed.name;
+    WriteTo(parser, prefix, std::string_view(parsed.type).substr(parsed.suffixSize));
+    parser.DropTo(parsed.nameEnd);
+  }
+  // Arrays as what fields of the type are.
+  void WriteWholeTo(QrexParser& parser, std::string_view prefix) const {
+    WriteTo(parser, prefix, parsed.type);
+    parser.DropTo(parser.previous.text.end);
+  }
+
+ private:
+  void WriteTo(QrexParser& parser, std::string_view prefix, TypeView type) const {
+    parser.out << prefix << TypeText(type) << " " << parsed.name;
     parser.Flush();
   }
 };
@@ -196,7 +207,6 @@ void ParseGlobalVar(QrexParser& parser) {
   const Declaration declaration(parser, flags.reflected, "Variable declaration");
   parser.CheckNotExported(AddDeclared<GlobalVarDef>(parser, flags, declaration, "var"));
   declaration.WriteTo(parser, "");
-  parser.DropTo(declaration.parsed.nameEnd);
   CopyToSemicolon(parser, "Missing semicolon after definition of variable " + declaration.parsed.name,
                   declaration.begin);
 }
@@ -207,8 +217,13 @@ void ParseTypedef(QrexParser& parser) {
   const Declaration declaration(parser, flags.reflected, "Type");
   const auto& def = AddDeclared<TypedefDef>(parser, flags, declaration, "typedef");
   parser.CheckPublicHeader(def);
-  if (!flags.isExtern) declaration.WriteTo(parser, "typedef ");
-  parser.DropTo(declaration.parsed.nameEnd);
+  if (flags.isExtern) {
+    parser.DropTo(declaration.parsed.nameEnd);
+  } else if (def.WantsCompilableText()) {  // a model could not have fields of a bare array
+    declaration.WriteWholeTo(parser, "typedef ");
+  } else {
+    declaration.WriteTo(parser, "typedef ");
+  }
   parser.CheckMetadata(def);
   CopyToSemicolon(parser, "Missing semicolon after typedef " + declaration.parsed.name, declaration.begin);
   Write(parser.out, R"(

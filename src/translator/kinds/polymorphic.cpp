@@ -67,6 +67,7 @@ class Dispatch {
           WriteCall();
         } else {
           WriteLevel(depth + 1);
+          if (m_isVoid && m_def.WantsCompilableText()) m_out << "    break;\n";  // a call does not return from here
         }
       }
     };
@@ -89,10 +90,16 @@ class Dispatch {
       if (&argument != &m_def.signature.arguments.front()) m_out << ",";
       m_out << argument.name;
       if (!argument.polymorphic) continue;
-      m_out << ".as<" << level->variant->m_items[level->item]->EffectiveName() << ">()";
+      m_out << ".as<" << ItemName(*level->variant, *level->variant->m_items[level->item]) << ">()";
       ++level;
     }
     m_out << (m_isVoid ? "); break;\n" : ");\n");
+  }
+
+  // The struct of a named item stands in the class of the variant.
+  std::string ItemName(const VariantDef& variant, const VariantItem& item) const {
+    const bool inVariant = item.IsNamed() && m_def.WantsCompilableText();
+    return (inVariant ? variant.GetQualifiedName() + "::" : "") + item.EffectiveName();
   }
 
   TextWriter& m_out;

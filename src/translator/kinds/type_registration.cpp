@@ -40,6 +40,13 @@ void ParseType(QrexParser& parser) {
   }
 }
 
+void CheckNestedRecord(QrexParser& parser, const NameSpaceElement& element) {
+  parser.WarnOfText(PrintedElement(element) +
+                        " stands in a class, which has no place for a record: declare it in the name space, or leave "
+                        "<<reflect>> out",
+                    element);
+}
+
 void WriteTypeRegistration(TextWriter& out, const TypeRegistration& registration, RegistrationLists& lists) {
   const std::string type = TypeText(registration.code);
   const std::string mangled = MangledType(registration.code);

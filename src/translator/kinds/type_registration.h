@@ -9,6 +9,7 @@ namespace qrex {
 class QrexParser;
 
 void ParseType(QrexParser& parser);
+void CheckNestedRecord(QrexParser& parser, const NameSpaceElement& element);  // W1018 at what is reflected in a class
 void WriteTypeRegistration(TextWriter& out, const TypeRegistration& registration,
                            RegistrationLists& lists);  // in a tail
 

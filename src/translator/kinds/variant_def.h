@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "translator/declared/class_def.h"
 #include "translator/declared/qualifiers.h"
 #include "translator/emit/records.h"
 #include "translator/symbols/type_predicates.h"
@@ -43,6 +44,10 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
   bool AllVoid() const;
   bool WritesToStream() const { return qualifiers.os != TriState::Off; }
   uint32_t TypeOpsBits() const;
+  // Where its members are defined. Behind a nested class there is no place for them but within the enclosing one.
+  Placement MemberPlacement() const {
+    return m_nested && WantsCompilableText() ? Placement::InClass : Placement::OutOfClass;
+  }
 
   bool m_hasDefault = false;
   ClassQualifiers qualifiers;

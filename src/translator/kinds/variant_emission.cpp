@@ -4,6 +4,8 @@
 
 #include "translator/emit/emit.h"
 #include "translator/kinds/variant_def.h"
+#include "translator/kinds/variant_members.h"
+#include "translator/symbols/scanned_file.h"
 
 namespace qrex {
 
@@ -30,22 +32,29 @@ void WriteStreamWrite(TextWriter& out, const VariantItem& item) {
         "name"_ = item.name, "fields"_ = Each(out, item.fields, " << ','", writeField));
 }
 
-void WriteArchives(TextWriter& out, const VariantItem& item) {
+void WriteArchives(TextWriter& out, const VariantItem& item, bool isEmpty) {
   auto writeOut = [&](const ClassField& field) { out << " << " << field.name; };
   auto writeIn = [&](const ClassField& field) { out << " >> " << field.name; };
   Write(out, R"(
-    template<typename Archive> void Serialise(Archive& _ar) const { _ar$out$; }
-    template<typename Archive> void Deserialise(Archive& _ar) { _ar$in$; }
+    template<typename Archive> void Serialise(Archive& _ar) const { $archive$$out$; }
+    template<typename Archive> void Deserialise(Archive& _ar) { $archive$$in$; }
   )",
-        "out"_ = Each(out, item.fields, "", writeOut), "in"_ = Each(out, item.fields, "", writeIn));
+        "archive"_ = isEmpty ? "(void)_ar" : "_ar", "out"_ = Each(out, item.fields, "", writeOut),
+        "in"_ = Each(out, item.fields, "", writeIn));
 }
 
 // `scope`: the variant and "::" in the out-of-class form.
 void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item, std::string_view scope) {
+  const bool isEmpty = item.fields.empty() && def.WantsCompilableText();  // all its values are equal
   auto writeParameter = [&](const ClassField& field) {
     Write(out, "$type$ const& $name$_", "type"_ = TypeView(field.type), "name"_ = field.name);
   };
   auto writeInitialiser = [&](const ClassField& field) { Write(out, "$name$($name$_)", "name"_ = field.name); };
+  auto writeMemberwise = [&] {
+    Write(out, "$name$($parameters$) : $initialisers$ {}\n", "name"_ = item.name,
+          "parameters"_ = Each(out, item.fields, ",", writeParameter),
+          "initialisers"_ = Each(out, item.fields, ",", writeInitialiser));
+  };
   auto writeEquality = [&](const ClassField& field) { Write(out, " && $name$ == _rhs.$name$", "name"_ = field.name); };
   auto writeField = [&](const ClassField& field) {
     PrintDeclaration(out, field.type, field.name, DeclarationMode::Plain);
@@ -53,14 +62,14 @@ void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item
   };
   auto writeOperations = [&] {
     if (def.WritesToStream()) WriteStreamWrite(out, item);
-    if (def.HasSerialise()) WriteArchives(out, item);
+    if (def.HasSerialise()) WriteArchives(out, item, isEmpty);
   };
   Write(out, R"(
     struct $scope$$name$
     {
         enum { tag=$tag$ };
         $name$() {}
-        $name$($parameters$) : $initialisers$ {}
+        $memberwise$
         bool operator==($name$ const& _rhs) const { return true$equalities$; }
         bool operator<($name$ const& _rhs) const { return $less$; }
         $operations$
@@ -68,17 +77,25 @@ void WriteStruct(TextWriter& out, const VariantDef& def, const VariantItem& item
         $fields$
     };
   )",
-        "scope"_ = scope, "name"_ = item.name, "tag"_ = item.tag,
-        "parameters"_ = Each(out, item.fields, ",", writeParameter),
-        "initialisers"_ = Each(out, item.fields, ",", writeInitialiser),
-        "equalities"_ = Each(out, item.fields, "", writeEquality), "less"_ = LessText(item.fields),
+        "scope"_ = scope, "name"_ = item.name, "tag"_ = item.tag, "memberwise"_ = If(!isEmpty, writeMemberwise),
+        "equalities"_ = Each(out, item.fields, "", writeEquality), "less"_ = isEmpty ? "false" : LessText(item.fields),
         "operations"_ = writeOperations, "fields"_ = Each(out, item.fields, "", writeField));
 }
 
 // --- The class
 
+bool IsInClass(const VariantDef& def) { return def.MemberPlacement() == Placement::InClass; }
+
+// Of member templates: the parameter of a class around the variant must not be named alike.
+std::string_view ParameterOf(const VariantDef& def) { return IsInClass(def) ? "_T" : "T"; }
+
+// What is behind the class where that is not nested in another one: there it can be used as if it were complete.
+bool IsDefinedBehind(const VariantDef& def, const VariantItem& item) {
+  return item.isStruct && item.onHeap && !IsInClass(def);
+}
+
 void WriteItemType(TextWriter& out, const VariantDef& def, const VariantItem& item) {
-  if (item.isStruct && item.onHeap) {
+  if (IsDefinedBehind(def, item)) {
     out << "struct " << item.name << ";\n";
   } else if (item.isStruct) {
     WriteStruct(out, def, item, "");
@@ -103,14 +120,9 @@ void WriteItemType(TextWriter& out, const VariantDef& def, const VariantItem& it
   }
 }
 
-// Without its arguments.
-std::string ConstructionText(const VariantItem& item, const std::string& type) {
-  return (item.onHeap ? "*(" + type + "**)_data = new " : "new (_data) ") + type;
-}
-
 void WriteConstructor(TextWriter& out, const VariantDef& def, const VariantItem& item) {
   const std::string& name = item.EffectiveName();
-  if (item.isStruct && item.onHeap) {
+  if (IsDefinedBehind(def, item)) {
     Write(out, "$variant$($name$ const& _rhs);\n", "variant"_ = def.name, "name"_ = name);
     return;
   }
@@ -145,10 +157,12 @@ void WriteAccess(TextWriter& out, const VariantItem& item) {
 void WriteOperationDeclarations(TextWriter& out, const VariantDef& def) {
   if (!def.AllVoid()) {
     Write(out, R"(
-      template<typename T> const typename _mapvalue_<T>::Value& as() const { return as((T*)0); }
-      template<typename T> typename _mapvalue_<T>::Value& as() { return as((T*)0); }
-    )");
+      template<typename $T$> const typename _mapvalue_<$T$>::Value& as() const { return as(($T$*)0); }
+      template<typename $T$> typename _mapvalue_<$T$>::Value& as() { return as(($T$*)0); }
+    )",
+          "T"_ = ParameterOf(def));
   }
+  if (IsInClass(def)) return;
   if (def.WritesToStream()) out << "void Write(vesk::xostream&) const;\n";
   if (def.HasSerialise()) {
     Write(out, R"(
@@ -158,12 +172,27 @@ void WriteOperationDeclarations(TextWriter& out, const VariantDef& def) {
   }
 }
 
+// What `as` answers for the types of items without a name. In a class only a part of the parameters can be specialised.
+void WriteMapValues(TextWriter& out, const VariantDef& def) {
+  const bool inClass = IsInClass(def);
+  for (const auto& item : def.m_items) {
+    if (item->IsNamed()) continue;
+    Write(out, R"(
+      template <$parameter$> struct $scope$_mapvalue_<$type$ $argument$> { enum { tag=$tag$ }; typedef $type$ Value; };
+    )",
+          "parameter"_ = If(inClass, "typename _Any"),
+          "scope"_ = inClass ? "" : def.name + "::", "type"_ = item->typeText, "argument"_ = If(inClass, ",_Any"),
+          "tag"_ = item->tag);
+  }
+}
+
 void WriteAccesses(TextWriter& out, const VariantDef& def) {
   if (def.AllVoid()) return;
   Write(out, R"(
-    template<typename T> typename T::Value const& as(T*) const { vxAssert(is<T>()); return *(typename T::Value const*)_data; }
-    template<typename T> typename T::Value& as(T*) { vxAssert(is<T>()); return *(typename T::Value*)_data; }
-  )");
+    template<typename $T$> typename $T$::Value const& as($T$*) const { vxAssert(is<$T$>()); return *(typename $T$::Value const*)_data; }
+    template<typename $T$> typename $T$::Value& as($T$*) { vxAssert(is<$T$>()); return *(typename $T$::Value*)_data; }
+  )",
+        "T"_ = ParameterOf(def));
   for (const auto& item : def.m_items) WriteAccess(out, *item);
 }
 
@@ -179,6 +208,8 @@ void WriteData(TextWriter& out, const VariantDef& def) {
 }  // namespace
 
 void WriteVariantBody(TextWriter& out, const VariantDef& def) {
+  const bool inClass = IsInClass(def);
+  auto declared = [&](std::string text) { return inClass ? std::string() : text; };  // is defined behind the class
   auto writeItemType = [&](const auto& item) { WriteItemType(out, def, *item); };
   auto writeConstructor = [&](const auto& item) { WriteConstructor(out, def, *item); };
   auto writeTest = [&](const auto& item) {
@@ -188,31 +219,38 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
   Write(
       out, R"(
     $itemTypes$
-    template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
+    template<typename $T$$any$> struct _mapvalue_ { enum { tag=$T$::tag }; typedef typename $T$::Value Value; };
+    $mapValues$
     $constructors$
-    $name$($name$ const& _rhs);
-    ~$name$();
+    $copying$
     $name$& operator=($name$ const& _rhs)
     {
         if (this != &_rhs) { this->~$name$(); new (this) $name$(_rhs); }
         return *this;
     }
-    void VisitObjects(vesk::IObjectVisitor&) const;
-    void VisitPrefs(vesk::IPrefVisitor&) const;
+    $visiting$
     vesk::int32 GetTag() const { return _tag; }
-    bool operator==($name$ const& _rhs) const;
+    $equal$
     bool operator!=($name$ const& _rhs) const { return !operator==(_rhs); }
-    bool operator<($name$ const& _rhs) const;
-    template<typename T> bool is() const { return is((T*)0); }
+    $less$
+    template<typename $T$> bool is() const { return is(($T$*)0); }
     $operations$
+    $members$
     private:
     $accesses$
     $tests$
     vesk::int32 _tag;
     $data$
   )",
-      "name"_ = def.name, "itemTypes"_ = Each(out, def.m_items, "", writeItemType),
+      "name"_ = def.name, "itemTypes"_ = Each(out, def.m_items, "", writeItemType), "T"_ = ParameterOf(def),
+      "any"_ = If(inClass, ",typename=void"), "mapValues"_ = If(inClass, [&] { WriteMapValues(out, def); }),
       "constructors"_ = Each(out, def.m_items, "", writeConstructor),
+      "copying"_ = declared(def.name + "(" + def.name + " const& _rhs);\n~" + def.name + "();"),
+      "visiting"_ =
+          declared("void VisitObjects(vesk::IObjectVisitor&) const;\nvoid VisitPrefs(vesk::IPrefVisitor&) const;"),
+      "equal"_ = declared("bool operator==(" + def.name + " const& _rhs) const;"),
+      "less"_ = declared("bool operator<(" + def.name + " const& _rhs) const;"),
+      "members"_ = If(inClass, [&] { WriteVariantMembers(out, def); }),
       "operations"_ = [&] { WriteOperationDeclarations(out, def); }, "accesses"_ = [&] { WriteAccesses(out, def); },
       "tests"_ = Each(out, def.m_items, "", writeTest), "data"_ = [&] { WriteData(out, def); });
 }
@@ -221,239 +259,66 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
 
 namespace {
 
-enum class Operation { Copy, Destroy, Equal, Less, Print, VisitObjects, VisitPrefs, Serialise, Deserialise };
-
-std::string DestructionText(const VariantItem& item, const std::string& value) {
-  const std::string& name = item.EffectiveName();
-  if (item.onHeap) return "delete *(" + name + "**)_data;";
-  if (item.isStruct) return "(*(" + name + "**)_data)->~" + name + "();";
-  const std::string destructor = QualifiedDestructorText(item.type);
-  return destructor.empty() ? "" : value + "." + destructor + "();";
+// Through which others use the variant: streams, archives, visitors and the reflection of the runtime.
+void WriteFunctions(TextWriter& out, const VariantDef& def) {
+  const bool isNested = IsInClass(def);
+  const std::string_view friendWord = If(isNested, "friend ");  // else they were members of the enclosing class
+  Write(out, R"(
+    $friend$inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$name$ const& _x) { _x.VisitObjects(_v); return _v; }
+    $friend$inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$name$ const*) { return _v; }
+    $friend$inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,$name$ const& _x) { _x.VisitPrefs(_v); return _v; }
+  )",
+        "friend"_ = friendWord, "name"_ = def.name);
+  if (def.WritesToStream()) {
+    Write(out, R"(
+      $friend$inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x) { _x.Write(_os); return _os; }
+    )",
+          "friend"_ = friendWord, "name"_ = def.name);
+  }
+  if (def.m_reflected && !isNested) {
+    Write(out, R"(
+      $api$vesk::ReflectedVariant const& _GetReflected($name$ const*);
+      $api$vesk::TypeOps const& _GetTypeOps($name$ const*);
+    )",
+          "api"_ = ExportPrefix(def), "name"_ = def.name);
+  }
+  if (def.HasSerialise()) {
+    Write(out, R"(
+      template<typename Archive> $friend$inline void Serialise(Archive& _ar,$name$ const& _x) { _x.Serialise(_ar); }
+      template<typename Archive> $friend$inline void Deserialise(Archive& _ar,$name$ & _x) { _x.Deserialise(_ar); }
+    )",
+          "friend"_ = friendWord, "name"_ = def.name);
+  }
 }
 
-std::string PrintText(const VariantItem& item, const std::string& value) {
-  const std::string& name = item.EffectiveName();
-  if (item.isStruct) return value + ".Write(_os);";
-  if (item.isVoid) return "_os << \"" + name + "\";";
-  if (item.IsNamed()) return "_os << \"" + name + "(\" << " + value + " << ')';";
-  return "_os << " + value + ";";
+void WriteHeapStructs(TextWriter& out, const VariantDef& def) {
+  auto isHeapStruct = [](const auto& item) { return item->isStruct && item->onHeap; };
+  for (const auto& item : def.m_items) {
+    if (isHeapStruct(item)) WriteStruct(out, def, *item, def.name + "::");
+  }
+  for (const auto& item : def.m_items) {
+    if (!isHeapStruct(item)) continue;
+    Write(out, R"(
+      inline $variant$::$variant$($name$ const& _x)
+      {
+          _tag = $tag$;
+          $construction$(_x);
+      }
+    )",
+          "variant"_ = def.name, "name"_ = item->name, "tag"_ = item->tag,
+          "construction"_ = ConstructionText(*item, item->name));
+  }
 }
-
-// What an operation does with an item; empty for nothing.
-std::string StatementOf(Operation operation, const VariantDef& def, const VariantItem& item) {
-  const std::string& name = item.EffectiveName();
-  const std::string value = "as<" + name + " >()";
-  switch (operation) {
-    case Operation::Copy:
-      return item.isVoid ? "" : ConstructionText(item, name) + "(_rhs." + value + ");";
-    case Operation::Destroy:
-      return DestructionText(item, value);
-    case Operation::Equal:
-      return item.isVoid ? "" : "return " + value + " == _rhs." + value + ";";
-    case Operation::Less:
-      return item.isVoid ? "" : "return " + value + " < _rhs." + value + ";";
-    case Operation::Print:
-      return PrintText(item, value);
-    case Operation::VisitObjects:
-      return def.ItemVisits(item, NeedsVisitObjects) ? "_v << " + value + ";" : "";
-    case Operation::VisitPrefs:
-      return def.ItemVisits(item, NeedsVisitPrefs) ? "_v << " + value + ";" : "";
-    case Operation::Serialise:
-      return item.isStruct ? value + ".Serialise(_ar);" : item.isVoid ? "" : "_ar << " + value + ";";
-    case Operation::Deserialise:
-      if (item.isVoid) return {};
-      return ConstructionText(item, item.isStruct ? name : item.typeText) + "(); " +
-             (item.isStruct ? value + ".Deserialise(_ar);" : "_ar >> " + value + ";");
-  }
-  return {};
-}
-
-class VariantTail {
- public:
-  VariantTail(TextWriter& out, const VariantDef& def) : m_out(out), m_def(def), m_name(def.name) {}
-
-  void WriteAll() {
-    WriteMapValues();
-    WriteFunctions();
-    WriteHeapStructs();
-    WriteCopying();
-    WriteComparisons();
-    if (m_def.WritesToStream()) WriteStreamWrite();
-    WriteVisits();
-    if (m_def.HasSerialise()) WriteArchives();
-  }
-
- private:
-  // A case for each item with which the operation has something to do; nothing without such an item.
-  void WriteSwitch(Operation operation) {
-    const bool returns = operation == Operation::Equal || operation == Operation::Less;
-    std::string cases;
-    for (const auto& item : m_def.m_items) {
-      const std::string statement = StatementOf(operation, m_def, *item);
-      if (statement.empty()) continue;
-      if (!cases.empty()) cases += "\n";
-      cases += "case " + std::to_string(item->tag) + " : " + statement + (returns ? "" : " break;");
-    }
-    if (cases.empty()) return;
-    Write(m_out, R"(
-      switch(_tag)
-      {
-          $cases$
-          $default$
-      }
-    )",
-          "cases"_ = cases, "default"_ = operation == Operation::Print ? "default: vxAssert(0);" : "");
-  }
-  auto Switch(Operation operation) {
-    return [this, operation] { WriteSwitch(operation); };
-  }
-
-  void WriteMapValues() {
-    for (const auto& item : m_def.m_items) {
-      if (item->IsNamed()) continue;
-      Write(m_out, R"(
-        template <> struct $name$::_mapvalue_<$type$ > { enum { tag=$tag$ }; typedef $type$ Value; };
-      )",
-            "name"_ = m_name, "type"_ = item->typeText, "tag"_ = item->tag);
-    }
-  }
-
-  // Through which others use the variant: streams, archives, visitors and the reflection of the runtime.
-  void WriteFunctions() {
-    Write(m_out, R"(
-      inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$name$ const& _x) { _x.VisitObjects(_v); return _v; }
-      inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,$name$ const*) { return _v; }
-      inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,$name$ const& _x) { _x.VisitPrefs(_v); return _v; }
-    )",
-          "name"_ = m_name);
-    if (m_def.WritesToStream()) {
-      Write(m_out, R"(
-        inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x) { _x.Write(_os); return _os; }
-      )",
-            "name"_ = m_name);
-    }
-    if (m_def.m_reflected) {
-      Write(m_out, R"(
-        $api$vesk::ReflectedVariant const& _GetReflected($name$ const*);
-        $api$vesk::TypeOps const& _GetTypeOps($name$ const*);
-      )",
-            "api"_ = ExportPrefix(m_def), "name"_ = m_name);
-    }
-    if (m_def.HasSerialise()) {
-      Write(m_out, R"(
-        template<typename Archive> inline void Serialise(Archive& _ar,$name$ const& _x) { _x.Serialise(_ar); }
-        template<typename Archive> inline void Deserialise(Archive& _ar,$name$ & _x) { _x.Deserialise(_ar); }
-      )",
-            "name"_ = m_name);
-    }
-  }
-
-  void WriteHeapStructs() {
-    auto isHeapStruct = [](const auto& item) { return item->isStruct && item->onHeap; };
-    for (const auto& item : m_def.m_items) {
-      if (isHeapStruct(item)) WriteStruct(m_out, m_def, *item, m_name + "::");
-    }
-    for (const auto& item : m_def.m_items) {
-      if (!isHeapStruct(item)) continue;
-      Write(m_out, R"(
-        inline $variant$::$variant$($name$ const& _x)
-        {
-            _tag = $tag$;
-            $construction$(_x);
-        }
-      )",
-            "variant"_ = m_name, "name"_ = item->name, "tag"_ = item->tag,
-            "construction"_ = ConstructionText(*item, item->name));
-    }
-  }
-
-  void WriteCopying() {
-    Write(m_out, R"(
-      inline $name$::$name$($name$ const& _rhs)
-      {
-          _tag = _rhs._tag;
-          $copy$
-      }
-      inline $name$::~$name$()
-      {
-          $destroy$
-      }
-    )",
-          "name"_ = m_name, "copy"_ = Switch(Operation::Copy), "destroy"_ = Switch(Operation::Destroy));
-  }
-
-  void WriteComparisons() {
-    Write(m_out, R"(
-      inline bool $name$::operator==($name$ const& _rhs) const
-      {
-          if (_tag != _rhs._tag) return false;
-          $equal$
-          return true;
-      }
-      inline bool $name$::operator<($name$ const& _rhs) const
-      {
-          if (_tag < _rhs._tag) return true;
-          if (_tag > _rhs._tag) return false;
-          $less$
-          return false;
-      }
-    )",
-          "name"_ = m_name, "equal"_ = Switch(Operation::Equal), "less"_ = Switch(Operation::Less));
-  }
-
-  void WriteStreamWrite() {
-    Write(m_out, R"(
-      inline void $name$::Write(vesk::xostream& _os) const
-      {
-          $print$
-      }
-    )",
-          "name"_ = m_name, "print"_ = Switch(Operation::Print));
-  }
-
-  void WriteVisits() {
-    Write(m_out, R"(
-      inline void $name$::VisitObjects(vesk::IObjectVisitor& _v) const
-      {
-          $visitObjects$
-      }
-      inline void $name$::VisitPrefs(vesk::IPrefVisitor& _v) const
-      {
-          $visitPrefs$
-      }
-    )",
-          "name"_ = m_name, "visitObjects"_ = Switch(Operation::VisitObjects),
-          "visitPrefs"_ = Switch(Operation::VisitPrefs));
-  }
-
-  void WriteArchives() {
-    const bool destroys = std::any_of(m_def.m_items.begin(), m_def.m_items.end(), [this](const auto& item) {
-      return !StatementOf(Operation::Destroy, m_def, *item).empty();
-    });
-    Write(m_out, R"(
-      template<typename Archive> inline void $name$::Serialise(Archive& _ar) const
-      {
-          vesk::SerialiseVariableLengthUint(_ar,_tag);
-          $serialise$
-      }
-      template<typename Archive> inline void $name$::Deserialise(Archive& _ar)
-      {
-          $destruction$
-          vesk::DeserialiseVariableLengthUint(_ar,_tag);
-          $deserialise$
-      }
-    )",
-          "name"_ = m_name, "serialise"_ = Switch(Operation::Serialise),
-          "destruction"_ = destroys ? "this->~" + m_name + "();" : "", "deserialise"_ = Switch(Operation::Deserialise));
-  }
-
-  TextWriter& m_out;
-  const VariantDef& m_def;
-  const std::string& m_name;
-};
 
 }  // namespace
 
-void WriteVariantTail(TextWriter& out, const VariantDef& def) { VariantTail(out, def).WriteAll(); }
+void WriteVariantTail(TextWriter& out, const VariantDef& def) {
+  const bool isNested = IsInClass(def);
+  if (!isNested) WriteMapValues(out, def);
+  WriteFunctions(out, def);
+  if (isNested) return;
+  WriteHeapStructs(out, def);
+  WriteVariantMembers(out, def);
+}
 
 }  // namespace qrex

@@ -2,6 +2,7 @@
 
 #include "translator/emit/emit.h"
 #include "translator/emit/records.h"
+#include "translator/kinds/type_registration.h"
 #include "translator/kinds/variant_def.h"
 #include "translator/kinds/variant_emission.h"
 #include "translator/reader/qrex_parser.h"
@@ -20,6 +21,7 @@ class VariantStatement {
   void ReadHeading();
   void ReadQualifiers();
   void ReadBody();
+  void CheckTextInClass() const;
   void CheckTextOfItems() const;
   void ReadDefault();
   void ReadItem();
@@ -152,6 +154,19 @@ void VariantStatement::ReadBody() {
   }
 }
 
+void VariantStatement::CheckTextInClass() const {
+  if (!m_def->m_nested || !m_parser.WantsCompilableText()) return;
+  if (m_def->m_reflected) CheckNestedRecord(m_parser, *m_def);
+  for (const auto& item : m_def->m_items) {
+    for (const ClassField& field : item->fields) {
+      if (TypeText(field.type) != m_def->name) continue;
+      m_parser.WarnOfText("Item " + item->name + " of " + PrintedElement(*m_def) +
+                              " has a value of it, and is complete before it: declare it in the name space",
+                          *m_def);
+    }
+  }
+}
+
 void VariantStatement::CheckTextOfItems() const {
   if (!m_parser.WantsCompilableText() || !m_def->HasSerialise()) return;
   for (const auto& item : m_def->m_items) {
@@ -187,6 +202,7 @@ void VariantStatement::Parse() {
   m_parser.Flush();
   m_parser.CheckReferences(*m_def);
   m_parser.CheckMetadata(*m_def);
+  CheckTextInClass();
   CheckTextOfItems();
   m_parser.DropBehindCurrent();
 }

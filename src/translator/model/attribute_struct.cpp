@@ -78,9 +78,9 @@ void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
   const TypeView inner = undecorated.type;
   const TypeOp op = inner.Op();
   scope.readOnly = scope.readOnly || undecorated.Has(kHasConst);
-  WriteConversions(scope, TypeText(type), undecorated.Has(kHasOffsettable));
+  WriteConversions(scope, TypeText(m_access == Access::GetAndSet ? inner : type), undecorated.Has(kHasOffsettable));
 
-  if (undecorated.Has(kHasAssignable)) return WritePlain(scope, type, inner);
+  if (undecorated.Has(kHasAssignable) || m_access == Access::GetAndSet) return WritePlain(scope, type, inner);
   if (undecorated.Has(kHasOffsettable)) return WriteOffset(scope, type, op);
   if (const ClassDef* model = ModelOfType(inner, m_root)) return WriteModel(scope, *model);
   if (IsVectorLike(inner)) {
@@ -103,11 +103,10 @@ void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
 
 void AttributeWriter::WriteConversions(const Scope& scope, std::string_view type, bool isOffsettable) {
   const std::string key = scope.Key();
-  const bool isMethods = m_access == Access::Methods;
   Write(m_out, "operator $type$$reference$() const { return $self$->Get$field$($key$); }\n", "type"_ = type,
-        "reference"_ = isMethods || isOffsettable ? "" : " const&", "self"_ = scope.constSelf,
+        "reference"_ = ReturnsByValue() || isOffsettable ? "" : " const&", "self"_ = scope.constSelf,
         "field"_ = scope.accessor, "key"_ = key);
-  if (isMethods) return;
+  if (ReturnsByValue()) return;
   auto write = [&] {
     if (m_access != Access::Barriers) return;
     Write(m_out, "$type$ & write() { return $self$->Write$field$($key$); }\n", "type"_ = type, "self"_ = scope.self,
@@ -289,6 +288,13 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
 
 // --- Forwarders: a proxy offers the accessors that the operators inside it call, with its own index filled in.
 
+bool AttributeWriter::IsForwardedAsWhole(const Undecorated& type) const {
+  const TypeOp op = type.type.Op();
+  if (type.Has(kHasAssignable) || IsForwardedScalar(op)) return true;
+  if (!m_forwardsAll || op == kOpSet || (op != kOpClass && NeedsForwarders(op))) return false;
+  return !ModelOfType(type.type, m_root);
+}
+
 void AttributeWriter::WriteForwarders(size_t first, size_t last, TypeView type, const std::string& name,
                                       bool readOnly) {
   const Undecorated undecorated = WithoutDecorators(type, m_root);
@@ -304,7 +310,11 @@ void AttributeWriter::WriteForwarders(size_t first, size_t last, TypeView type, 
   )",
         "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments, "type"_ = TypeText(type));
 
-  if (undecorated.Has(kHasAssignable) || IsForwardedScalar(op)) {
+  if (m_forwardsAll && m_access == Access::Barriers) {
+    Write(m_out, "$type$& Write$name$($parameters$) { return _self->Write$name$($arguments$); }\n", "type"_ = type,
+          "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments);
+  }
+  if (IsForwardedAsWhole(undecorated)) {
     if (readOnly) return;
     Write(m_out, "void $verb$$name$($parameters$$value$) { _self->$verb$$name$($arguments$_v); }\n",
           "verb"_ = undecorated.Has(kHasOffsettable) ? "Offset" : "Set", "name"_ = name,
@@ -360,7 +370,7 @@ void AttributeWriter::WriteContainerForwarders(size_t first, size_t last, PathEl
   Write(m_out, "vesk::ssize_t Get$name$Size($parameters$) const { return _self->Get$name$Size($arguments$); }\n",
         "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments);
   m_path.Push(std::move(element));
-  if (elementType.WithoutMetadata().IsBuiltIn()) {
+  if (elementType.WithoutMetadata().IsBuiltIn() && !m_forwardsAll) {
     const std::string elementParameters = ForwardedParameters(first, last + 1);
     const std::string elementArguments = FieldPath::Arguments(first, last + 2);
     Write(m_out,

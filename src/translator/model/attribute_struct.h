@@ -22,7 +22,8 @@ enum class Access {
   Struct,      // the field itself, in the struct that holds it
   Barriers,    // the field, behind a read or write barrier
   Operations,  // the genop_ functions of the runtime
-  Methods      // the methods of an interface, which return by value
+  Methods,     // the methods of an interface, which return by value
+  GetAndSet    // those two alone, of the whole value
 };
 
 class AttributeWriter {
@@ -47,6 +48,7 @@ class AttributeWriter {
     std::string Key() const { return inProxy ? ParameterName(depth - 1) : std::string(); }
   };
 
+  bool ReturnsByValue() const { return m_access == Access::Methods || m_access == Access::GetAndSet; }
   void WriteOperators(Scope scope, TypeView type);
   void WriteConversions(const Scope& scope, std::string_view type, bool isOffsettable);
   void WriteModel(const Scope& scope, const ClassDef& model);
@@ -56,6 +58,7 @@ class AttributeWriter {
   void WriteKeySet(const Scope& scope, TypeView key);
   void WriteProxy(const Scope& scope, PathElement element, const std::string& keyType, TypeView elementType);
 
+  bool IsForwardedAsWhole(const Undecorated& type) const;
   void WriteForwarders(size_t first, size_t last, TypeView type, const std::string& name, bool readOnly);
   void WriteContainerForwarders(size_t first, size_t last, PathElement element, TypeView elementType,
                                 const std::string& name, bool readOnly);
@@ -65,6 +68,7 @@ class AttributeWriter {
   NameSpace& m_root;
   FieldPath m_path;  // indexes and keys only
   const Access m_access;
+  const bool m_forwardsAll = m_root.WantsCompilableText();  // to elements of elements, too
 };
 
 }  // namespace qrex

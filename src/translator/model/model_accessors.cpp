@@ -31,6 +31,7 @@ class AccessorWriter {
 
  private:
   void WriteField(PathElement element, TypeView type, const std::string& name, const std::string& expression);
+  void WriteWriting(TypeView type, const std::string& name, const std::string& expression);
   void WriteByType(TypeView type, const std::string& name, const std::string& expression);
   void WritePathFunctions(const std::string& name);
   void WriteSet(TypeView type, const std::string& name, const std::string& expression);
@@ -56,6 +57,7 @@ class AccessorWriter {
   FieldPath m_path;
   const Access m_access;
   const bool m_implementsIObject;
+  const bool m_allAreWritten = m_root.WantsCompilableText();  // attribute structs have write() for containers, too
 };
 
 void AccessorWriter::WriteReadBarrier(const std::string& name, const std::string& expression) {
@@ -108,6 +110,7 @@ void AccessorWriter::WriteField(PathElement element, TypeView type, const std::s
   )",
       "type"_ = TypeText(type), "name"_ = name, "parameters"_ = m_path.Parameters(), "expression"_ = expression,
       "barrier"_ = [&] { WriteReadBarrier(name, expression); });
+  if (m_allAreWritten) WriteWriting(type, name, expression);
   WriteByType(type, name, expression);
   m_path.Pop();
 }
@@ -158,19 +161,24 @@ std::string AccessorWriter::VectorOperation(std::string_view verb, TypeView elem
   return function + (NeedsVisitPrefs(element, m_root) ? "Vector_VisitPrefs" : "Vector");
 }
 
+void AccessorWriter::WriteWriting(TypeView type, const std::string& name, const std::string& expression) {
+  if (m_access == Access::Operations) return;
+  Write(
+      m_out, "$type$& Write$name$($parameters$) { $barrier$ return $expression$; }\n", "type"_ = type, "name"_ = name,
+      "parameters"_ = m_path.Parameters(), "barrier"_ = [&] { WriteWriteBarrier(expression); },
+      "expression"_ = expression);
+}
+
 void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
-  const std::string parameters = m_path.Parameters();
-  auto writeBarrier = [&] { WriteWriteBarrier(expression); };
-  if (m_access != Access::Operations) {
-    Write(m_out, "$type$& Write$name$($parameters$) { $barrier$ return $expression$; }\n", "type"_ = type,
-          "name"_ = name, "parameters"_ = parameters, "barrier"_ = writeBarrier, "expression"_ = expression);
-  }
+  if (!m_allAreWritten) WriteWriting(type, name, expression);
   auto writeAssignment = [&] {
     if (m_access == Access::Operations) return WriteOperation(AssignOperation(type), name, expression, "_v");
-    Write(m_out, "$barrier$$expression$ = _v;", "barrier"_ = writeBarrier, "expression"_ = expression);
+    Write(
+        m_out, "$barrier$$expression$ = _v;", "barrier"_ = [&] { WriteWriteBarrier(expression); },
+        "expression"_ = expression);
   };
   Write(m_out, "void Set$name$($parameters$$value$) { $assignment$ }\n", "name"_ = name,
-        "parameters"_ = WithComma(parameters), "value"_ = ConstReferenceText(type, "_v"),
+        "parameters"_ = WithComma(m_path.Parameters()), "value"_ = ConstReferenceText(type, "_v"),
         "assignment"_ = writeAssignment);
 }
 

@@ -14,6 +14,8 @@ const std::string& NameSpaceElement::GetQualifiedName() const {
   return m_qualifiedName;
 }
 
+bool NameSpaceElement::WantsCompilableText() const { return owner.host.Settings().compilableText; }
+
 void PrintElement(TextWriter& out, const NameSpaceElement& element) {
   out << "$" << element.GetKeyword() << (element.m_exported ? "+ " : " ") << element.GetQualifiedName();
 }

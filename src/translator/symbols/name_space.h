@@ -55,6 +55,8 @@ class NameSpaceElement {
 
   const std::string& GetQualifiedName() const;  // a::b::N; a root's elements have their bare name
 
+  bool WantsCompilableText() const;  // where the plain text could not compile
+
   void ForgetQualifiedName() { m_qualifiedName.clear(); }  // after the name was set late
   void SetExported(bool exported) { m_exported = m_reflected = m_registered = m_strict = exported; }  // what `+` says
 

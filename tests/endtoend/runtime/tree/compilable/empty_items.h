@@ -5,8 +5,7 @@ $warning(disable: 1009)
 namespace empty_items
 {
 
-
-$variant Command { { } stop; { int32 x; } go; *{ } boxed; void none; };
+$variant Command { default stop(); { } stop; { int32 x; } go; *{ } boxed; void none; };
 $variant+ Shown { default 1; int32; { } stop; };
 
 }

@@ -8,9 +8,14 @@ namespace polymorphic
 
 ROW
 {
-    Shape shape;
-    shape = vesk::float64(6.5);
-    CHECK(Area(shape), 6);
+    CHECK(Area(Shape(vesk::float64(6.5))), 6);
+    CHECK(Area(Shape(Shape::side(3))), 9);
+    CHECK(Area(Shape(Shape::name("four"))), 4);
+    CHECK(Area(Shape(Shape::point(2, 4))), 8);
+    CHECK(Area(Shape(Shape::boxed(6))), 7);
+    vesk::string8 met;
+    Meet(Left(Left::a(1)), Left(Left::b("x")), met);
+    CHECK(met, "ab");
 }
 
 }

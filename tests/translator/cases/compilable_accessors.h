@@ -1,0 +1,2 @@
+@import "Vesk/vxObject/IObject.h"
+$struct S <<-os>> : model { int32 grid[2][2]; } { };
