@@ -1,6 +1,23 @@
 // What the declarations of one header mean: a list of checks that fills itself.
 #pragma once
-@import "check/src/check.h"
+@import "Vesk/vxObject/IObject.h"
+
+#include <cstdio>
+
+inline int g_checks = 0;
+inline int g_failures = 0;
+
+// As texts: numbers of different types are equal then.
+template <typename Got, typename Expected>
+void Compare(Got const& got, Expected const& expected, const char* what, const char* file, int line)
+{
+    ++g_checks;
+    const vesk::xstring text = vxMakeString(got);
+    if (text == vxMakeString(expected)) return;
+    ++g_failures;
+    std::printf("%s(%d): %s is %s\n", file, line, what, text.c_str());
+}
+#define CHECK(got, expected) Compare(got, expected, #got, __FILE__, __LINE__)
 
 struct Row
 {
