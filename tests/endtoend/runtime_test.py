@@ -38,6 +38,20 @@ def compile_with_clang(workspace, projects, flags):
             workspace.shell(f"clang++ -std=c++17 -fsyntax-only -Wall -Werror {flags} {include} {source}")
 
 
+def read_as_visual_cpp(workspace, project):
+    """Parses the translated sources as Visual C++ does. The headers of the system are not made for that target: what is
+    found in them does not count."""
+    listing = subprocess.run(["g++", "-xc++", "-E", "-v", "/dev/null"], capture_output=True, text=True).stderr
+    system = [f"-isystem{folder}" for folder in re.findall(r"^ (/\S*include\S*)$", listing, re.MULTILINE)]
+    root = workspace.path("qrexsource/x64/Debug")
+    for source in sorted((root / project / "src").glob("*.cpp")):
+        command = ["clang++", "-std=c++17", "-fsyntax-only", "-w", "-ferror-limit=0", "-D_GNU_SOURCE", f"-I{root}", *system,
+                   "--target=x86_64-pc-windows-msvc", "-fms-compatibility", "-fdelayed-template-parsing", source]
+        errors = subprocess.run(command, capture_output=True, text=True).stderr
+        ours = re.findall(rf"^{root}/.* error: .*$", errors, re.MULTILINE)
+        assert not ours, "\n".join(ours[:20])
+
+
 def translate(binary, workspace_file, keys=""):
     """A workspace with a copy of the tree, translated; the folder of what comes of it."""
     settings = SETTINGS + (f'virtualTree += {{ "{ROOT / "runtime"}" }} workspaces = {{ "{workspace_file}" }} '
@@ -140,10 +154,7 @@ def test_compilable_text(binary):
     with build(binary, HERE / "runtime" / "tree", "compilable.qrws", "compilableText = true") as workspace:
         holds(workspace.shell("out/lib/x64/Debug/compilable"), " checks, 0 failures\n")
         compile_with_clang(workspace, ["compilable"], "-Wno-logical-op-parentheses -Wno-deprecated-declarations")
-        search = subprocess.run(["g++", "-xc++", "-E", "-v", "/dev/null"], capture_output=True, text=True).stderr
-        folders = re.findall(r"^ (/\S*include\S*)$", search, re.MULTILINE)
-        compile_with_clang(workspace, ["compilable"], "-w --target=x86_64-pc-windows-msvc -fms-compatibility "
-                           "-fdelayed-template-parsing " + " ".join(f"-isystem {folder}" for folder in folders))
+        read_as_visual_cpp(workspace, "compilable")
 
 
 def test_tour(binary):
