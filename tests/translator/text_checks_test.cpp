@@ -38,6 +38,13 @@ TEST_F(TextChecksTest, OneWarningForEach) {
       {"$interface B { void F(); };\n$interface rmi R : B { void G(); };",
        "3) : warning W1018 : The stub of $interface R has no methods of $interface B: declare them in it, and leave "
        "the base out"},
+      {"$interface B { void F(); void G(); };\n$interface I : B { int32 F(); void G() const; };",
+       "3) : warning W1018 : Method F of $interface I is there already, from $interface B: give it a name of its own, "
+       "or "
+       "leave it out"},
+      {"$struct S { $model { int32 a; } $dep int32 b = 5; };\n$struct M : model { int32 a; } { $dep int32 b = 5; };",
+       "2) : warning W1018 : $struct S has both nodes and a model in its body, and each of them is EvictDgsNodes: put "
+       "the model into the head"},
       {"$interface B { };\n$interface rmi R : B { void G(); };\n$interface I : B { void G(); };", ""},
       {"$enum E { a };\n$type E;",
        "3) : warning W1018 : $enum E has a record of its own: leave $type out, and write + or <<reflect>> there"},

@@ -70,6 +70,24 @@ bool HasFunctionsBeside(const ClassDef& def) {
          def.m_hasVisitBlock || def.HasSerialise() || def.HasPrint();
 }
 
+// A model in the body writes functions that the class needs for other things too.
+void CheckBodyModel(QrexParser& parser, const ClassDef& def) {
+  if (!def.HasEmbeddedModel() || def.m_inheritsModel || def.IsPureModel()) return;
+  const auto warn = [&](std::string_view what, std::string_view function) {
+    parser.WarnOfText(PrintedElement(def) + " has both " + std::string(what) +
+                          " and a model in its body, and each of them is " + std::string(function) +
+                          ": put the model into the head",
+                      def);
+  };
+  const auto isNode = [](const ClassField& field) { return field.kind != FieldKind::Plain; };
+  if (def.m_hasVisitBlock) warn("$visit", "VisitObjects");
+  if (def.m_hasEvictBlock) {
+    warn("$evict", "EvictDgsNodes");
+  } else if (!def.m_evictionMembers.empty() || std::any_of(def.m_fields.begin(), def.m_fields.end(), isNode)) {
+    warn("nodes", "EvictDgsNodes");
+  }
+}
+
 void CheckTemplateParameters(QrexParser& parser, const ClassDef& def) {
   const std::string& list = def.m_templateArgList;
   if (list.find('=') == std::string::npos && list.find("...") == std::string::npos) return;
@@ -95,11 +113,7 @@ void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
   CheckConstFields(parser, def);
   CheckTemplateParameters(parser, def);
   CheckLocal(parser, def);
-  if (def.m_hasVisitBlock && def.HasEmbeddedModel() && !def.m_inheritsModel) {
-    parser.WarnOfText(PrintedElement(def) + " has both $visit and a model in its body, and each of them is " +
-                          "VisitObjects: put the model into the head",
-                      def);
-  }
+  CheckBodyModel(parser, def);
   for (const ModelField* field : def.m_modelFields) CheckModelField(parser, def, *field);
   if (def.IsAdt() && def.IsTemplate() && !def.m_methods.empty()) {
     parser.WarnOfText(PrintedElement(def) +

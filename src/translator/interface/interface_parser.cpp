@@ -145,6 +145,7 @@ class InterfaceStatement {
   void CheckAttribute(const std::string& name, const TypeCode& type);
   void WriteText();
   void CheckTextOfMethods() const;
+  void CheckInheritedMethods() const;
   void AddDelegatorMixin();
   void RefuseNested(std::string_view modifier) {
     if (m_enclosing) m_parser.Fail("'" + std::string(modifier) + "' modifier not permitted on nested interface");
@@ -288,6 +289,7 @@ void InterfaceStatement::CheckTextOfMethods() const {
                           *m_def);
     }
   }
+  CheckInheritedMethods();
   if (!m_def->m_isIpc) return;
   for (const InterfaceDef::FlatBase& flat : m_def->FlattenedBases()) {
     const std::string& name = flat.base->GetQualifiedName();
@@ -295,6 +297,25 @@ void InterfaceStatement::CheckTextOfMethods() const {
     m_parser.WarnOfText("The stub of " + text + " has no methods of " + PrintedElement(*flat.base) +
                             ": declare them in it, and leave the base out",
                         *m_def);
+  }
+}
+
+// The handle has all methods of its bases.
+void InterfaceStatement::CheckInheritedMethods() const {
+  const auto isAlike = [](const FunctionSignature& a, const FunctionSignature& b) {
+    return a.name == b.name && a.isConst == b.isConst &&
+           std::equal(a.arguments.begin(), a.arguments.end(), b.arguments.begin(), b.arguments.end(),
+                      [](const FunctionArg& x, const FunctionArg& y) { return x.type == y.type; });
+  };
+  for (const InterfaceDef::FlatBase& flat : m_def->FlattenedBases()) {
+    for (const FunctionSignature& inherited : flat.base->m_methods) {
+      for (const FunctionSignature& method : m_def->m_methods) {
+        if (!isAlike(inherited, method)) continue;
+        m_parser.WarnOfText("Method " + method.name + " of " + PrintedElement(*m_def) + " is there already, from " +
+                                PrintedElement(*flat.base) + ": give it a name of its own, or leave it out",
+                            *m_def);
+      }
+    }
   }
 }
 
