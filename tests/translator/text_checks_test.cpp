@@ -42,6 +42,9 @@ TEST_F(TextChecksTest, OneWarningForEach) {
        "3) : warning W1018 : Method F of $interface I is there already, from $interface B: give it a name of its own, "
        "or "
        "leave it out"},
+      {"$interface I { const int32 a[]; const int32 b[3]; xvector<int32> c; };",
+       "2) : warning W1018 : Attribute a of $interface I is a container of const elements, which none can hold: leave "
+       "const out"},
       {"$struct S { $model { int32 a; } $dep int32 b = 5; };\n$struct M : model { int32 a; } { $dep int32 b = 5; };",
        "2) : warning W1018 : $struct S has both nodes and a model in its body, and each of them is EvictDgsNodes: put "
        "the model into the head"},

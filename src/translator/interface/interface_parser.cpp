@@ -289,6 +289,12 @@ void InterfaceStatement::CheckTextOfMethods() const {
                           *m_def);
     }
   }
+  for (const AttributeDef& attribute : m_def->m_attributes) {
+    if (!HasConstElements(attribute.type, *m_def->owner.rootNameSpace)) continue;
+    m_parser.WarnOfText("Attribute " + attribute.name + " of " + text +
+                            " is a container of const elements, which none can hold: leave const out",
+                        *m_def);
+  }
   CheckInheritedMethods();
   if (!m_def->m_isIpc) return;
   for (const InterfaceDef::FlatBase& flat : m_def->FlattenedBases()) {

@@ -159,6 +159,14 @@ int64_t DeclaredSize(Category category) {
 
 }  // namespace
 
+bool HasConstElements(TypeView decorated, NameSpace& root) {
+  const TypeView type = WithoutDecorators(decorated, root).type;
+  if (!type.HasInner()) return false;
+  const bool isContainer = (type.Op() >= kOpVector && type.Op() <= kOpDynArray) || type.Op() == kOpMap;
+  if (isContainer && WithoutDecorators(type.Inner(), root).Has(kHasConst)) return true;
+  return HasConstElements(type.Inner(), root);
+}
+
 const NameSpaceElement* VariantWithoutDefault(TypeView decorated, NameSpace& root) {
   const TypeView type = WithoutDecorators(decorated, root).type;
   if (type.Op() == kOpVariant) {

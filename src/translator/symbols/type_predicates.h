@@ -32,6 +32,7 @@ bool IsConstField(TypeView type, NameSpace& root);  // a field of it, or each of
 NameSpaceElement* NamedElement(TypeView type, NameSpace& root);  // of a named type; null: it isn't declared
 
 bool IsSerialisable(TypeView type, NameSpace& root);
+bool HasConstElements(TypeView type, NameSpace& root);  // of a container anywhere in it, but for fixed arrays
 // The first variant without a default value that a value of the type holds, also as an element; or null.
 const NameSpaceElement* VariantWithoutDefault(TypeView type, NameSpace& root);
 bool NeedsVisitObjects(TypeView type, NameSpace& root);
