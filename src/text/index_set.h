@@ -38,8 +38,8 @@ class IndexSet {
     std::array<Link, kChildren> children;
   };
 
-  static Node& Own(
-      Link& link);  // the node, to be changed: a new one where there is none or it is another set's as well
+  // The node, to be changed: a new one where there is none or it is another set's as well.
+  static Node& Own(Link& link);
   static void Unite(Link& ours, const Link& theirs);
 
   Link m_root;

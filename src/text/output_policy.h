@@ -41,9 +41,10 @@ class GeneratedFile : public IOutputStream {
   template <typename Step>
   void Try(Step step);
   void RaiseFailure() const;
-  const std::string m_path;
   std::string_view InMemory() const { return {m_buffer.data(), m_used}; }
-  char* MakeRoom(size_t length);            // behind what is in memory; the length is that of a part of a line
+  char* MakeRoom(size_t length);  // behind what is in memory; the length is that of a part of a line
+
+  const std::string m_path;
   boost::container::vector<char> m_buffer;  // grows without being cleared first
   size_t m_used = 0;
   File m_beside;

@@ -16,13 +16,13 @@ enum class ProjectFormat { Dsp, Vcproj, Vcxproj, Make };
 struct Compiler {
   CompilerKind kind;
   std::string_view keyword;  // in configurations, and in the block heads of projects
-  CompilerFamily family;
-  ProjectFormat format;
+  CompilerFamily family = CompilerFamily::VisualCpp;
+  ProjectFormat format = ProjectFormat::Make;
 
   // A build
-  std::string_view compile;  // both take a response file
-  std::string_view link;
-  std::string_view archive;
+  std::string_view compile = "";  // these take a response file
+  std::string_view link = "";
+  std::string_view archive = "";
   bool compilesResources = false;
   bool embedsManifest = false;
   std::string_view precompiledPrefix = "";  // of the name of the precompiled header
@@ -41,143 +41,102 @@ struct Compiler {
   bool namesLibraries = false;          // by -soname
 };
 
+// What the compilers of a family, or of a part of it, share.
+constexpr Compiler VisualStudio(Compiler row) {
+  row.family = CompilerFamily::VisualCpp;
+  row.compile = "cl /c";
+  row.link = "link.exe";
+  row.archive = "lib.exe";
+  row.compilesResources = row.embedsManifest = row.kind != CompilerKind::vc6;
+  row.buildsWithMSBuild = row.format == ProjectFormat::Vcxproj;
+  return row;
+}
+
+constexpr Compiler GccLike(Compiler row) {
+  row.family = CompilerFamily::Gcc;
+  row.format = ProjectFormat::Make;
+  row.compile = "gcc-4 -c";
+  row.archive = "ar rcs";
+  row.keepsRawSwitches = true;
+  row.buildsWithMSBuild = true;
+  return row;
+}
+
 // By CompilerKind.
 inline constexpr Compiler kCompilers[] = {
-    {
+    VisualStudio({
         .kind = CompilerKind::vc6,
         .keyword = "vc6",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Dsp,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
         .precompiledPrefix = "build_",
         .keepsRawSwitches = true,
         .keepsGuids = false,
-    },
-    {
+    }),
+    VisualStudio({
         .kind = CompilerKind::vc8,
         .keyword = "vc8",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Vcproj,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
-        .compilesResources = true,
-        .embedsManifest = true,
         .projectVersion = "8.00",
         .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 9.00\n# Visual Studio 2005\n",
-    },
-    {
+    }),
+    VisualStudio({
         .kind = CompilerKind::vc9,
         .keyword = "vc9",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Vcproj,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
-        .compilesResources = true,
-        .embedsManifest = true,
         .projectVersion = "9.00",
         .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 10.00\n# Visual Studio 2008\n",
-    },
-    {
+    }),
+    VisualStudio({
         .kind = CompilerKind::vc10,
         .keyword = "vc10",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Vcxproj,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
-        .compilesResources = true,
-        .embedsManifest = true,
         .projectVersion = "4.0",
         .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 11.00\n# Visual Studio 2010\n",
-        .buildsWithMSBuild = true,
-    },
-    {
+    }),
+    VisualStudio({
         .kind = CompilerKind::vc11,
         .keyword = "vc11",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Vcxproj,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
-        .compilesResources = true,
-        .embedsManifest = true,
         .projectVersion = "4.0",
         .toolset = "v110",
         .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2012\n",
-        .buildsWithMSBuild = true,
-    },
-    {
+    }),
+    VisualStudio({
         .kind = CompilerKind::vc12,
         .keyword = "vc12",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Vcxproj,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
-        .compilesResources = true,
-        .embedsManifest = true,
         .projectVersion = "12.0",
         .toolset = "v120",
         .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2013\n",
-        .buildsWithMSBuild = true,
-    },
-    {
+    }),
+    VisualStudio({
         .kind = CompilerKind::vc14,
         .keyword = "vc14",
-        .family = CompilerFamily::VisualCpp,
         .format = ProjectFormat::Vcxproj,
-        .compile = "cl /c",
-        .link = "link.exe",
-        .archive = "lib.exe",
-        .compilesResources = true,
-        .embedsManifest = true,
         .projectVersion = "14.0",
         .toolset = "v140",
         .solutionHeader = "Microsoft Visual Studio Solution File, Format Version 12.00\n# Visual Studio 2013\n",
-        .buildsWithMSBuild = true,
-    },
-    {
+    }),
+    GccLike({
         .kind = CompilerKind::gcc,
         .keyword = "gcc",
-        .family = CompilerFamily::Gcc,
-        .format = ProjectFormat::Make,
-        .compile = "gcc-4 -c",
         .link = "g++",
-        .archive = "ar rcs",
-        .keepsRawSwitches = true,
-        .buildsWithMSBuild = true,
         .makeTools = "CC = gcc\nCXX = g++\nAR = ar\n",
         .namesLibraries = true,
-    },
-    {
+    }),
+    GccLike({
         .kind = CompilerKind::winegcc,
         .keyword = "winegcc",
-        .family = CompilerFamily::Gcc,
-        .format = ProjectFormat::Make,
-        .compile = "gcc-4 -c",
         .link = "wineg++",
-        .archive = "ar rcs",
-        .keepsRawSwitches = true,
-        .buildsWithMSBuild = true,
         .makeTools = "CC = winegcc\nCXX = wineg++\nRC = wrc\nAR = ar\n",
         .librarySuffix = ".dll",
-    },
-    {
+    }),
+    GccLike({
         .kind = CompilerKind::clang,
         .keyword = "clang",
-        .family = CompilerFamily::Gcc,
-        .format = ProjectFormat::Make,
-        .compile = "gcc-4 -c",
         .link = "clang++",
-        .archive = "ar rcs",
-        .keepsRawSwitches = true,
-        .buildsWithMSBuild = true,
         .makeTools = "CC = clang\nCXX = clang++\nAR = libtool -static\n",
-    },
+    }),
 };
 
 constexpr const Compiler& CompilerOf(CompilerKind kind) { return kCompilers[static_cast<size_t>(kind)]; }

@@ -118,6 +118,7 @@ TEST_F(TextChecksTest, AModelThatHidesAnother) {
       "model that has the fields of both\n";
   AssertWarned(models + "$struct S : model Own mixin [ M ] { };", warning);
   AssertWarned(models + "$struct S : model { int32 c; } mixin [ M ] { };", warning);
+  AssertWarned(models + "$mixin L : mixin [ M ] { }; $struct S : model Own mixin [ L ] { };", warning);
   AssertWarned(models + "$struct S : mixin [ M ] { };", "");
 }
 

@@ -9,18 +9,25 @@ namespace qrex {
 
 namespace {
 
-// Both models are `_model_` then, and that of the list hides the other one.
+// Appends those of the class's mixins, and of theirs, that bring a model; the outermost comes last.
+void CollectModels(const ClassDef& def, std::vector<const ClassDef*>& models) {
+  for (const ClassDef* mixin : def.m_mixins) {
+    CollectModels(*mixin, models);
+    if (mixin->IsPureModel() || mixin->m_inheritsModel) models.push_back(mixin);
+  }
+}
+
+// All models are `_model_`, so that the outermost hides the others.
 void CheckModels(QrexParser& parser, const ClassDef& def) {
-  const auto hasModel = [](const ClassDef* mixin) { return mixin->IsPureModel() || mixin->m_inheritsModel; };
-  const auto& mixins = def.m_mixins;
-  const auto hiding = std::find_if(mixins.begin(), mixins.end(), hasModel);
-  if (hiding == mixins.end()) return;
+  std::vector<const ClassDef*> models;
+  CollectModels(def, models);
+  if (models.empty()) return;
   if (def.m_inheritsModel) {
     parser.ReportWarning(Warnings::kTwoModels,
-                         PrintedElement(def) + " archives and prints the model of " + PrintedElement(**hiding) +
+                         PrintedElement(def) + " archives and prints the model of " + PrintedElement(*models.back()) +
                              " in place of its own: write one model that has the fields of both",
                          &def);
-  } else if (def.m_reflected && std::count_if(mixins.begin(), mixins.end(), hasModel) > 1) {
+  } else if (def.m_reflected && models.size() > 1) {
     parser.WarnOfText(PrintedElement(def) + " lists several models: write one that has the fields of all", def);
   }
 }
@@ -124,6 +131,7 @@ void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
 }
 
 void CheckTextOfMethod(QrexParser& parser, const ClassDef& def, bool isPrivate, const char* position) {
+  if (!parser.WantsCompilableText()) return;
   const FunctionSignature& method = def.m_methods.back();
   if (isPrivate) {
     parser.WarnOfText("$ method " + method.name + " of " + PrintedElement(def) +
