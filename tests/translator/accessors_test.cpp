@@ -169,6 +169,13 @@ TEST_F(AccessorsTest, WithoutOperations) {
   }
 }
 
+TEST_F(AccessorsTest, BarriersOfAnObject) {
+  EXPECT_EQ(
+      Section(Mixin(" <<-genop>> isa I", "int32 x"), "K_model& model() { return _model_; }\n", "    K_model _model_"),
+      Spelt("    K_model const& read() const { vesk::DataSourceReadBarrier(C, C,\"K\"); return _model_; }\n"
+            "    K_model & write() { vesk::DataSourceWriteBarrier(S, S,\"K\"); return _model_; }\n"));
+}
+
 TEST_F(AccessorsTest, OperatorsOfAttributes) {
   const struct {
     const char *field, *text;

@@ -20,6 +20,15 @@ TEST_F(MixinsTest, RecordOfAClassWithMixins) {
   EXPECT_EQ(Section(tail, "K_modelFields[] =\n", "        };"),
             "        {\n            { \"y\", offsetof(K,_model_.y), K_y, 0, -1 },\n"
             "            { \"z\", offsetof(K,_model_.z), K_z, 0, -1 },\n");
+
+  settings.compilableText = true;  // the model in the body of a mixin has no member to stand in
+  const std::pair<std::string, std::string> models[] = {{"$mixin M { $model { int8 a; } };", "a"},
+                                                        {"$mixin M : model { int8 a; } { };", "_model_.a"},
+                                                        {"$model M { int8 a; };", "_model_.a"}};
+  for (const auto& [text, place] : models) {
+    const std::string record = TranslateHeader(text + " $struct+ K : mixin [ M ] { };").tail;
+    EXPECT_NE(record.find("{ \"a\", offsetof(K," + place + "), K_a, 0, -1 },\n"), record.npos) << text;
+  }
 }
 
 TEST_F(MixinsTest, Implementing) {

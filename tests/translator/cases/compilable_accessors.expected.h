@@ -191,8 +191,9 @@ template<> struct ClassTypeTraits<S>
 struct S : public S_model_mixin<vesk::BaseMixin<S,vesk::EmptyBase>>
 {
     typedef S_model_mixin<vesk::BaseMixin<S,vesk::EmptyBase>> BaseClass;
- 
+ S() : c(1) {} vesk::int32 const c; 
 public:
+    vesk::int32 Getc() const { return c; }
     
     void Serialise(vesk::Archive&) const;
     void Deserialise(vesk::InputArchive&);

@@ -48,6 +48,10 @@ namespace vesk { XTarget* app_GetXTarget(); }
             "K",
             "L",
         };
+        static const vesk::octet_t D_d_metadata[] =
+        {
+            0xe1,0xa4,0x01,0x00
+        };
         static const vesk::octet_t D_d_s[] =
         {
             0x36,0x31,0x10
@@ -84,10 +88,11 @@ namespace vesk { XTarget* app_GetXTarget(); }
         static vesk::ConstStringZ D_stringTable[] =
         {
             "doc",
+            "m",
         };
         static const vesk::ReflectedInterfaceMethod D_methods[] =
         {
-            {"d",{0},D_d_args,2,0},
+            {"d",{0},D_d_args,2,D_d_metadata},
             {"Getv",{D_Getv_return},0,0,0},
             {"Setv",{0},D_Setv_args,1,0},
         };
