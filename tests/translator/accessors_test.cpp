@@ -23,7 +23,9 @@ std::string Spelt(std::string text) {
 class AccessorsTest : public TranslateTest {
  protected:
   const std::string kDeclared =
-      "$interface+ I : vesk::IObject { };\n$enum E { e1 };\n$model Inner { bool y; };\n$typedef int32 Number;\n";
+      "$interface+ I : vesk::IObject { };\n$enum E { e1 };\n$model Inner { bool y; };\n$typedef int32 Number;\n"
+      "$variant V { bool; };\n$struct S { };\n"
+      "$model Whole { char16 c; E e; V d; ptr<I> p; pref<I> q; cref<Inner> r; S s; int32* t; };\n";
 
   std::string Mixin(const std::string& head, const std::string& field) {
     const std::string header =
@@ -273,6 +275,17 @@ TEST_F(AccessorsTest, ForwardersOfAKeyProxy) {
                 return xElement(const_cast<K_model_mixin*>(CAT),_k0);
             }
 )"));
+  }
+}
+
+TEST_F(AccessorsTest, ForwardersOfWholeFields) {
+  for (const bool all : {false, true}) {
+    settings.compilableText = all;
+    const std::string proxy = AttributeStruct("xmap<int8,Whole> x");
+    for (const std::string field : {"c", "d", "e", "p", "q", "r", "s", "t"}) {
+      const bool isForwarded = proxy.find("{ _self->SetxElement" + field + "(_k0,_v); }\n") != proxy.npos;
+      EXPECT_EQ(isForwarded, all || field < "s") << field;
+    }
   }
 }
 

@@ -1,6 +1,7 @@
 @import "Vesk/vxObject/IObject.h"
 $mixin M
 {//
-$cache - ^ <<async io>> void f(xvector<int32>& out) const with string8 in = name(); { }
+$cache - ^ <<async io>> void f(xvector<int32>& out) const with string8 in = name(); // starts
+{ }
 int end;
 };

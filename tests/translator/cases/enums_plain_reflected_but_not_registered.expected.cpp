@@ -4,6 +4,14 @@
 namespace vesk { XTarget* app_GetXTarget(); }
     vesk::ReflectedEnum const& _GetReflected(E const*)
     {
+        static const vesk::octet_t E_metadata[] =
+        {
+            0xe1,0xa4,0x00,0x00
+        };
+        static vesk::ConstStringZ E_stringTable[] =
+        {
+            "doc",
+        };
         static vesk::ConstStringZ E_strings[] =
         {
             "a",
@@ -22,8 +30,8 @@ namespace vesk { XTarget* app_GetXTarget(); }
         static const vesk::ReflectedEnum E_enum =
         {
             "E",
-            0,
-            0,
+            E_metadata,
+            E_stringTable,
             2,
             E_strings,
             E_values,

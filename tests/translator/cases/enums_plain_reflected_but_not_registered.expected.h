@@ -21,7 +21,7 @@ template<> struct TypeTraits<E>
     static const bool is_reflected = 1;
     static const bool is_registered = 0;
     static const vesk::ETypeTraitKind kind = vesk::TTK_enum;
-    static const bool has_metadata = 0;
+    static const bool has_metadata = 1;
 };
 } // namespace vesk
 

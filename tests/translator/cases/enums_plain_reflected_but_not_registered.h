@@ -1,2 +1,2 @@
 @import "Vesk/vxObject/IObject.h"
-$enum E <<reflect>> { a, -b = 7 };
+$enum E <<reflect>> : [ "doc" ] { a, -b = 7 };

@@ -77,13 +77,22 @@ namespace vesk { XTarget* app_GetXTarget(); }
         {
             { "v", D_Setv_v },
         };
+        static const vesk::octet_t D_Getw_return[] =
+        {
+            0x01
+        };
         static const vesk::octet_t D_v[] =
         {
             0x04
         };
+        static const vesk::octet_t D_w[] =
+        {
+            0x31,0x01
+        };
         static const vesk::ReflectedAttribute D_attributes[] =
         {
             { "v",D_v },
+            { "w",D_w },
         };
         static vesk::ConstStringZ D_stringTable[] =
         {
@@ -95,6 +104,7 @@ namespace vesk { XTarget* app_GetXTarget(); }
             {"d",{0},D_d_args,2,D_d_metadata},
             {"Getv",{D_Getv_return},0,0,0},
             {"Setv",{0},D_Setv_args,1,0},
+            {"Getw",{D_Getw_return},0,0,0},
         };
         static const vesk::ReflectedInterface D_interface =
         {
@@ -102,8 +112,8 @@ namespace vesk { XTarget* app_GetXTarget(); }
             D_metadata,
             D_bases,2,
             3,
-            D_methods,3,
-            D_attributes,1,
+            D_methods,4,
+            D_attributes,2,
             D_stringTable
         };
         return D_interface;

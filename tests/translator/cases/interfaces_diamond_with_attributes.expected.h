@@ -203,6 +203,7 @@ struct D
         void (__stdcall *d)(void* _self,vesk::string8 const& s,vesk::int32 n);
         vesk::int32 (__stdcall *Getv)(void const* _self);
         void (__stdcall *Setv)(void* _self,vesk::int32 v);
+        bool (__stdcall *Getw)(void const* _self);
     };
     D(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
     
@@ -214,6 +215,7 @@ struct D
         static void __stdcall d(void* _self,vesk::string8 const& s,vesk::int32 n) { ((T*)_self)->d(s,n); }
         static vesk::int32 __stdcall Getv(void const* _self) { return ((const T*)_self)->Getv(); }
         static void __stdcall Setv(void* _self,vesk::int32 v) { ((T*)_self)->Setv(v); }
+        static bool __stdcall Getw(void const* _self) { return ((const T*)_self)->Getw(); }
         static const FnTable& GetTable()
         {
             static const FnTable t =
@@ -231,7 +233,8 @@ struct D
                 },
                 &d,
                 &Getv,
-                &Setv
+                &Setv,
+                &Getw
             };
             return t;
         }
@@ -245,6 +248,7 @@ struct D
     void d(vesk::string8 const& s,vesk::int32 n=3) { m_table->d(m_self,s,n); }
     vesk::int32 Getv() const { return m_table->Getv(m_self); }
     void Setv(vesk::int32 v) { m_table->Setv(m_self,v); }
+    bool Getw() const { return m_table->Getw(m_self); }
     
     operator A() const { return A(m_self, &m_table->_K._A); }
     operator K() const { return K(m_self, &m_table->_K); }
@@ -257,6 +261,10 @@ struct D
             operator vesk::int32() const { return CONST_ATTRIB_CAST(D,v)->Getv(); }
             void operator=(vesk::int32 const& _v) { ATTRIB_CAST(D,v)->Setv(_v); }
         } v;
+        struct
+        {
+            operator bool const() const { return CONST_ATTRIB_CAST(D,w)->Getw(); }
+        } w;
         void* m_self;
     };
     FnTable const* m_table;
@@ -267,6 +275,7 @@ struct DDelegatorMixin : public BC
     void d(vesk::string8 const& s,vesk::int32 n=3) { BC::GetD().d(s,n); }
     vesk::int32 Getv() const { return BC::GetD().Getv(); }
     void Setv(vesk::int32 v) { BC::GetD().Setv(v); }
+    bool Getw() const { return BC::GetD().Getw(); }
 };
 
 vesk::ReflectedInterface const& _GetReflected(D const*);
