@@ -8,6 +8,7 @@ struct I
     struct FnTable
     {
         vesk::xmap<vesk::string8,vesk::string8 > (__stdcall *Getm)(void const* _self);
+        vesk::xmap<vesk::int32,vesk::xset<vesk::int8> > (__stdcall *Gets)(void const* _self);
     };
     I(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
     
@@ -17,11 +18,13 @@ struct I
     template<typename T> struct Stubs
     {
         static vesk::xmap<vesk::string8,vesk::string8 > __stdcall Getm(void const* _self) { return ((const T*)_self)->Getm(); }
+        static vesk::xmap<vesk::int32,vesk::xset<vesk::int8> > __stdcall Gets(void const* _self) { return ((const T*)_self)->Gets(); }
         static const FnTable& GetTable()
         {
             static const FnTable t =
             {
-                &Getm
+                &Getm,
+                &Gets
             };
             return t;
         }
@@ -31,6 +34,7 @@ struct I
     template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<I*>(this)->m_self = const_cast<T*>(_rhs); const_cast<I*>(this)->m_table = &Stubs<T>::GetTable(); }
     
     vesk::xmap<vesk::string8,vesk::string8 > Getm() const { return m_table->Getm(m_self); }
+    vesk::xmap<vesk::int32,vesk::xset<vesk::int8> > Gets() const { return m_table->Gets(m_self); }
     
     union
     {
@@ -53,6 +57,21 @@ struct I
                 return mElement(const_cast<I*>(CONST_ATTRIB_CAST(I,m)),_k0);
             }
         } m;
+        struct
+        {
+            operator vesk::xmap<vesk::int32,vesk::xset<vesk::int8> > const() const { return CONST_ATTRIB_CAST(I,s)->Gets(); }
+            struct sElement
+            {
+                sElement(I* _self, vesk::int32 _k) : _self(_self),_k0(_k) {}
+                operator vesk::xset<vesk::int8>() const { return _self->GetsElement(_k0); }
+                I* _self;
+                vesk::int32 _k0;
+            };
+            sElement const operator[](vesk::int32 _k0) const
+            {
+                return sElement(const_cast<I*>(CONST_ATTRIB_CAST(I,s)),_k0);
+            }
+        } s;
         void* m_self;
     };
     FnTable const* m_table;
@@ -61,6 +80,7 @@ template <typename BC>
 struct IDelegatorMixin : public BC
 {
     vesk::xmap<vesk::string8,vesk::string8 > Getm() const { return BC::GetI().Getm(); }
+    vesk::xmap<vesk::int32,vesk::xset<vesk::int8> > Gets() const { return BC::GetI().Gets(); }
 };
 
 namespace vesk

@@ -189,21 +189,21 @@ namespace vesk
 {
 template<> struct TypeTraits<K>
 {
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
+    static const bool is_exported = 1;
+    static const bool is_reflected = 1;
+    static const bool is_registered = 1;
     static const vesk::ETypeTraitKind kind = vesk::TTK_class;
     static const bool has_metadata = 0;
 };
 template<> struct ClassTypeTraits<K>
 {
-    static const bool has_reflected_default_ctor = 0;
-    static const bool has_reflected_dtor = 0;
-    static const bool has_reflected_copy_ctor = 0;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
+    static const bool has_reflected_default_ctor = 1;
+    static const bool has_reflected_dtor = 1;
+    static const bool has_reflected_copy_ctor = 1;
+    static const bool has_reflected_equality = 1;
+    static const bool has_reflected_compare = 1;
+    static const bool has_reflected_write_xostream = 1;
+    static const bool has_reflected_serialise = 1;
     static const bool has_reflected_visit_IObjects = 0;
     static const bool has_reflected_visit_Prefs = 0;
     static const bool implements_IObject = 0;
@@ -224,8 +224,11 @@ public:
     
     void Serialise(vesk::Archive&) const;
     void Deserialise(vesk::InputArchive&);
+    friend vesk::ReflectedClass const& _GetReflected(K const*);
 };
 
+vesk::ReflectedClass const& _GetReflected(K const*);
+vesk::TypeOps const& _GetTypeOps(K const*);
 
 inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,K const& _x) { _x.VisitObjects(_v); return _v; }
 inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,K const*) { return _v; }

@@ -1,6 +1,6 @@
 @import "Vesk/vxObject/IObject.h"
 $model M { xset<int32> s; };
-$class K : model M
+$class+ K : model M
 {
     int more;
 };
