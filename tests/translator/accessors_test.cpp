@@ -25,7 +25,8 @@ class AccessorsTest : public TranslateTest {
   const std::string kDeclared =
       "$interface+ I : vesk::IObject { };\n$enum E { e1 };\n$model Inner { bool y; };\n$typedef int32 Number;\n"
       "$variant V { bool; };\n$struct S { };\n"
-      "$model Whole { char16 c; E e; V d; ptr<I> p; pref<I> q; cref<Inner> r; S s; int32* t; };\n";
+      "$model Whole { char16 c; E e; V d; ptr<I> p; pref<I> q; cref<Inner> r; S s; int32* t; };\n"
+      "$model Names { string8 n[]; };\n";
 
   std::string Mixin(const std::string& head, const std::string& field) {
     const std::string header =
@@ -287,6 +288,14 @@ TEST_F(AccessorsTest, ForwardersOfWholeFields) {
       EXPECT_EQ(isForwarded, all || field < "s") << field;
     }
   }
+}
+
+// Keys are counted from the proxy that is the object.
+TEST_F(AccessorsTest, ForwardersOfAProxyWithinAModel) {
+  const std::string proxy = Section(AttributeStruct("xmap<int8,Names> x"), "struct xElementnElement\n", "struct");
+  const std::string path =
+      "vesk::Path GetxElementnElementPath() const { return _self->GetxElementnElementPath(_k0); }\n";
+  EXPECT_NE(proxy.find(path), proxy.npos) << proxy;
 }
 
 TEST_F(AccessorsTest, NestingIsBounded) {
