@@ -301,7 +301,10 @@ TEST_F(AccessorsTest, ForwardersOfAProxyWithinAModel) {
 TEST_F(AccessorsTest, NestingIsBounded) {
   std::string type = "bool";
   for (int i = 0; i < 60; ++i) type = "DynArray<" + type + " >";
-  AssertErrors({{"$model M { " + type + " x; };", 1, "Field x : type nested too deeply"}});
+  std::string models = "$model M0 { bool x; }; ";
+  for (int i = 1; i < 60; ++i) models += "$model M" + ToString(i) + " { M" + ToString(i - 1) + " x; }; ";
+  AssertErrors({{"$model M { " + type + " x; };", 1, "Field x : type nested too deeply"},
+                {models, 1, "Field x : type nested too deeply"}});
 }
 
 }  // namespace

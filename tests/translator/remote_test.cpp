@@ -3,20 +3,7 @@
 namespace qrex {
 namespace {
 
-class RemoteTest : public TranslateTest {
- protected:
-  // An interface with a method of no parameters, one with all directions, one that only answers.
-  std::string Declared(const std::string& kind) {
-    return "$model Pos { bool y; };\nnamespace n\n{\n$interface+ " + kind + R"( J
-{
-    void none() const;
-    void all([in] int32 a, [in] const string8& b, [out] string8& c, [inout] xvector<int8>& d, [copy] Pos* e);
-    void back([out] int8& r);
-};
-}
-)";
-  }
-};
+using RemoteTest = TranslateTest;
 
 TEST_F(RemoteTest, Faults) {
   const std::vector<ErrorCase> cases = {
@@ -25,6 +12,12 @@ TEST_F(RemoteTest, Faults) {
       {"int32 a;", 2, "Attributes currently not supported on IPC interfaces"},
   };
   AssertErrors(cases, "$interface ipc I {\n", " };");
+}
+
+TEST_F(RemoteTest, RegisteredNames) {
+  TranslateHeader("$interface rmi I { };\nnamespace n { $interface ipc J { }; }");
+  EXPECT_EQ((std::vector<std::string>{"StubI", "SkeletonI", "n::StubJ", "n::ScionJ"}),
+            host->RegisterMap().entries["app/src/t.cpp"]);
 }
 
 }  // namespace

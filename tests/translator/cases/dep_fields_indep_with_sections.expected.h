@@ -42,7 +42,9 @@ void w_destroy(int*& w) const
 bool w_evictable() const
 { return false; } 
 void w_evict() const
-{ }
+{ } 
+void w_visit(vesk::IObjectVisitor& _v) const
+{ _v << S::shared; }
 int* _w_;
 struct Indepnode_w : vesk::DGIndepNode
 {
@@ -62,7 +64,7 @@ struct Indepnode_w : vesk::DGIndepNode
     virtual void VisitContainingObject(vesk::IObjectVisitor& _v) const
     {
         S const* _self = CONST_ATTRIB_CAST(S,w);
-        _v << _self->_w_;
+        _self->w_visit(_v);
     }
     virtual bool IsEvictable() const
     {
