@@ -83,9 +83,10 @@ class ToolsTest : public ::testing::Test, public TraceHook {
   }
   static ProjectFile& AddSource(Project& project, const std::string& name, const std::string& text = {}) {
     const std::string path = project.sourceDir + "/" + name;
-    auto& file = project.filesByPath[path] = std::make_unique<ProjectFile>();
+    auto made = std::make_unique<ProjectFile>();
+    made->path = path;
+    auto& file = project.filesByPath.emplace(made->path, std::move(made)).first->second;
     file->project = &project;
-    file->path = path;
     file->name = name;
     StemOf(name, file->stem);
     file->kind = FileKindOf(name.substr(file->stem.size() + 1));

@@ -48,7 +48,7 @@ class GenerateTest : public ::testing::Test, public TraceHook {
     for (const auto& loaded : workspace->projects) loaded->guid.bytes.fill(static_cast<uint8_t>(0x11 * ++digit));
   }
   void Generate() {
-    Generator generator;
+    Generator generator(settings.leftovers);
     for (const auto& project : workspace->projects) {
       generator.WriteProject(*project, Form::Plain);
       if (project->usesQrex) generator.WriteProject(*project, Form::Translated);

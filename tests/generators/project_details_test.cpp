@@ -181,7 +181,7 @@ TEST_F(ProjectDetailsTest, GccWorkspaces) {
   settings.compiler = CompilerKind::gcc;
   Workspace empty(settings);
   empty.name = "all";
-  Generator().WriteWorkspace(empty, Form::Plain);
+  Generator(settings.leftovers).WriteWorkspace(empty, Form::Plain);
   EXPECT_EQ(trace, "");
   EXPECT_TRUE(std::filesystem::is_empty("."));
 

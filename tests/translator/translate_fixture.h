@@ -281,7 +281,7 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     file->isPublicHeader = file->kind == FileKind::H && IsLibrary(project.targetType) &&
                            path.compare(0, project.sourceDir.size(), project.sourceDir) != 0;
     project.rootFolder.files.push_back(file.get());
-    project.filesByPath[path] = std::move(file);
+    project.filesByPath.emplace(file->path, std::move(file));
     project.filesCollected = false;
     project.folders.clear();
     CreateDirectories(m_root + "/" + path, false);

@@ -205,8 +205,9 @@ TEST_F(ProjectTest, Names) {
                                 "{ \"app.CPP\" \"p.h\" \"src\" { \"q.H\" \"r.Py\" \".x\" \"noext\" } }");
   std::string kinds;
   for (const auto& [path, file] : project.filesByPath) {
-    kinds += path + " " + file->stem + " " + file->extension + " " + std::to_string(static_cast<int>(file->kind)) +
-             (file->isMainSource ? " main" : "") + (file->isPublicHeader ? " public\n" : "\n");
+    kinds += std::string(path) + " " + file->stem + " " + file->extension + " " +
+             std::to_string(static_cast<int>(file->kind)) + (file->isMainSource ? " main" : "") +
+             (file->isPublicHeader ? " public\n" : "\n");
   }
   EXPECT_EQ(
       "app/app.CPP app cpp 2 main\napp/p.h p h 3 public\napp/src/.x .x x 0\napp/src/noext noext  0\napp/src/q.H q h 3\n"
