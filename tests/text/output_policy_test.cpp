@@ -8,12 +8,12 @@
 
 #include "platform/system.h"
 #include "text/scope_timer.h"
-#include "workspace/workspace_fixture.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
 
-class OutputPolicyTest : public WorkspaceTest {
+class OutputPolicyTest : public WorldTest {
  protected:
   int WriteText(const std::string& text, const std::string& path) {
     MemoryTextWriter writer;

@@ -4,7 +4,7 @@
 
 #include "text/output_policy.h"
 #include "workspace/file_filter.h"
-#include "workspace/workspace_fixture.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
@@ -34,18 +34,18 @@ std::string Printed(const OptionMap& options) {
   return text;
 }
 
-class ProjectTest : public WorkspaceTest {
+class ProjectTest : public WorldTest {
  protected:
+  ProjectTest() { settings.virtualTree = {"tree", "more"}; }
+
   Project* TryLoad(const std::string& text) {
-    Restart();
     trace.clear();
     Write("tree/app/src/app.qrpj", text);
-    return workspace->LoadProject("app/src/app.qrpj");
+    return World::Load({"app"}) ? &App() : nullptr;
   }
   Project& Load(const std::string& text) {
-    Project* project = TryLoad(text);
-    EXPECT_TRUE(project) << text << trace;
-    return project ? *project : *workspace->projects.front();
+    EXPECT_TRUE(TryLoad(text)) << text << trace;
+    return App();
   }
   void AssertTree(const std::string& tree, const std::string& expected) {
     EXPECT_EQ(expected, Printed(Load(kHeads + tree).rootFolder)) << tree;
