@@ -132,6 +132,7 @@ bool LoadDependencyFile(ProjectBuilder& builder, const std::string& path) {
 
 void SaveDependencyFile(ProjectBuilder& builder, const std::string& path) {
   CreateDirectories(path, false);
+  builder.settings.leftovers.Beside(path);
   try {
     WriteCheckedFile(kMagic, DependencyPayload(builder), path);
     builder.registerMap.dirty = builder.unregisterMap.dirty = false;

@@ -159,7 +159,7 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   bool linked = false;
   CreateDirectories(target, false);
   try {
-    const CommandFile response(responseFile, text);
+    const CommandFile response(builder.settings.leftovers, responseFile, text);
     TraceWriter() << "Linking...\n";
     if (builder.settings.diagnostics) TraceWriter() << responseFile << " = " << text << "\n";
     if (isGcc) DeleteFile(target);  // an archive would keep members of objects that are gone
@@ -201,7 +201,7 @@ bool UpdateManifest(const ProjectBuilder& builder) {
   const std::string text = "/outputresource:\"" + builder.LibraryDirectory() + "/" + name + "\";#" +
                            std::string(resource) + " /manifest \"./" + directory + "/" + name +
                            ".intermediate.manifest\"\n";
-  const CommandFile response(directory + "/mt.rsp", text);
+  const CommandFile response(builder.settings.leftovers, directory + "/mt.rsp", text);
   if (builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
   return RunManifestCommand(builder, "mt.exe @\"" + response.Path() + "\" /nologo");
 }
@@ -210,7 +210,7 @@ bool UpdateManifest(const ProjectBuilder& builder) {
 bool MarkManifestTime(const ProjectBuilder& builder) {
   std::string directory;
   ReplaceChar(builder.IntermediateDirectory(), directory, '/', '\\');
-  const CommandFile batch(builder.IntermediateDirectory() + "/mtdep.bat",
+  const CommandFile batch(builder.settings.leftovers, builder.IntermediateDirectory() + "/mtdep.bat",
                           "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
   return RunManifestCommand(builder, "\"" + directory + "\\mtdep.bat\"");
 }

@@ -240,8 +240,8 @@ void ExportFolder(Project& project, const ProjectConfig& config, const ProjectFo
     if (file->excluded) continue;
     const std::string source = project.SourcePath(*file);
     const std::string translated = project.usesQrex ? PathJoin(TranslationDirectory(config), file->path) : source;
-    CopyIfNewer(translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
-    CopyIfNewer(source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
+    CopyIfNewer(settings.leftovers, translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
+    CopyIfNewer(settings.leftovers, source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
   }
   for (const auto& subfolder : folder.subfolders) {
     if (&folder == &project.rootFolder && subfolder->name == "src") continue;

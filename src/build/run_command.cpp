@@ -118,7 +118,8 @@ bool RunCommand(const std::string& command, int& returnCode, const CommandOption
   return true;
 }
 
-CommandFile::CommandFile(std::string path, std::string_view text) : m_path(std::move(path)) {
+CommandFile::CommandFile(LeftoverSweep& leftovers, std::string path, std::string_view text) : m_path(std::move(path)) {
+  leftovers.Beside(m_path);
   ReplaceFile(m_path, WithCarriageReturns(text));
 }
 

@@ -4,6 +4,8 @@
 #include <string>
 #include <string_view>
 
+#include "text/files.h"
+
 namespace qrex {
 
 struct CommandOptions {
@@ -25,7 +27,7 @@ bool IsAbnormalEnd(int returnCode);
 // A file that only the next command reads. Raises FileException when it cannot be written.
 class CommandFile {
  public:
-  CommandFile(std::string path, std::string_view text);
+  CommandFile(LeftoverSweep& leftovers, std::string path, std::string_view text);
   ~CommandFile();
   CommandFile(const CommandFile&) = delete;
   CommandFile& operator=(const CommandFile&) = delete;

@@ -89,7 +89,7 @@ bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& respons
   options.errorsIntoOutput = IsGccFamily(builder.settings.compiler);  // where that family writes its messages
   if (options.echo) TraceWriter() << responseFile << " = " << text << "\n";
   try {
-    const CommandFile response(responseFile, text);
+    const CommandFile response(builder.settings.leftovers, responseFile, text);
     if (RunCommand(command + " @\"" + responseFile + "\"", returnCode, options)) return true;
     TraceWriter() << responseFile << ": " << text << "\n";
   } catch (const FileException& exception) {

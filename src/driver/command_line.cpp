@@ -37,22 +37,7 @@ bool ReadAssignment(const std::string& argument, std::string& name, std::string&
   }
 }
 
-class CommandLine {
- public:
-  explicit CommandLine(const std::vector<std::string>& arguments) : m_arguments(arguments) {}
-  int Run();
-
- private:
-  size_t ReadAssignments();
-  void ReadConfigurationPath(const std::string& argument);
-  void RunParallelBuild();
-
-  const std::vector<std::string>& m_arguments;
-  ConfigSettings m_settings;
-  std::string m_configPath;
-  std::string m_solution;  // as typed, without the leading `*`
-  bool m_parallelBuild = false;
-};
+}  // namespace
 
 // The index of the first argument that is no assignment.
 size_t CommandLine::ReadAssignments() {
@@ -91,7 +76,7 @@ void CommandLine::RunParallelBuild() {
   timer.Label() << "Parallel build with devenv";
 }
 
-int CommandLine::Run() {
+int CommandLine::RunConfiguration() {
   WriteToConsole(std::string(ProductLine()) + "\n");
   OpenTrace("stdout", false, false);
   if (m_arguments.size() < 2) {
@@ -121,13 +106,11 @@ int CommandLine::Run() {
     WriteToConsole("PATH = " + environment->PATH + "\nINCLUDE = " + environment->INCLUDE +
                    "\nLIB = " + environment->LIB + "\n");
   }
-  if (!RunWorkspace(m_settings)) return 1;
+  if (!RunWorkspace(m_settings, &m_loaded)) return 1;
   if (m_parallelBuild) RunParallelBuild();
   CloseTrace();
   return 0;
 }
-
-}  // namespace
 
 namespace {
 
@@ -141,10 +124,12 @@ int RunInit(const std::vector<std::string>& arguments) {
   return InitWorkspace(arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
 }
 
-// What the first argument may ask for in place of a run.
-int Dispatch(const std::vector<std::string>& arguments) {
-  const std::string_view first = arguments.size() > 1 ? arguments[1] : std::string_view();
-  if (first == "--init") return RunInit(arguments);
+}  // namespace
+
+// The first argument may ask for something else than a run.
+int CommandLine::Dispatch() {
+  const std::string_view first = m_arguments.size() > 1 ? m_arguments[1] : std::string_view();
+  if (first == "--init") return RunInit(m_arguments);
   if (first == "--help") {
     WriteToConsole(HelpText());
     return 0;
@@ -153,14 +138,12 @@ int Dispatch(const std::vector<std::string>& arguments) {
     WriteToConsole("Qrex " + std::string(Version()) + "\n");
     return 0;
   }
-  return CommandLine(arguments).Run();
+  return RunConfiguration();
 }
 
-}  // namespace
-
-int RunCommandLine(const std::vector<std::string>& arguments) {
+int CommandLine::Run() {
   try {
-    return Dispatch(arguments);
+    return Dispatch();
   } catch (const IException& exception) {
     TraceWriter() << exception << "\n";
   } catch (const std::exception& exception) {

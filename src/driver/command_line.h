@@ -1,12 +1,34 @@
 // What the process is given, and the order of its steps.
 #pragma once
 
+#include <memory>
 #include <string>
+#include <utility>
 #include <vector>
+
+#include "workspace/config_settings.h"
 
 namespace qrex {
 
-// `arguments`: the program's path first. The exit status.
-int RunCommandLine(const std::vector<std::string>& arguments);
+class CommandLine {
+ public:
+  explicit CommandLine(std::vector<std::string> arguments)
+      : m_arguments(std::move(arguments)) {}  // the program's path first
+  int Run();                                  // the exit status
+
+ private:
+  int Dispatch();
+  int RunConfiguration();
+  size_t ReadAssignments();
+  void ReadConfigurationPath(const std::string& argument);
+  void RunParallelBuild();
+
+  const std::vector<std::string> m_arguments;
+  ConfigSettings m_settings;
+  std::shared_ptr<void> m_loaded;  // what the run made of the settings
+  std::string m_configPath;
+  std::string m_solution;  // as typed, without the leading `*`
+  bool m_parallelBuild = false;
+};
 
 }  // namespace qrex

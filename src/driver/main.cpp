@@ -1,6 +1,3 @@
-#include <string>
-#include <vector>
-
 #include "driver/command_line.h"
 #include "platform/console.h"
 #include "platform/system.h"
@@ -13,13 +10,13 @@ constexpr size_t kStackSize = size_t{1} << 30;
 }  // namespace
 
 int main(int argc, char** argv) {
-  const std::vector<std::string> arguments(argv, argv + argc);
   int status = 1;
   qrex::platform::FillStandardHandles();
   qrex::platform::FailWritesBeyondLimit();
   qrex::platform::TuneHeap();
   qrex::platform::BufferStdout();
-  qrex::platform::RunOnStack(kStackSize, [&] { status = qrex::RunCommandLine(arguments); });
+  static auto& commandLine = *new qrex::CommandLine({argv, argv + argc});  // left to the end of the process
+  qrex::platform::RunOnStack(kStackSize, [&] { status = commandLine.Run(); });
   qrex::platform::FlushStdout();
   return status;
 }

@@ -50,7 +50,7 @@ class WorkspaceRun {
 
   ConfigSettings& m_settings;
   Workspace m_workspace;
-  Generator m_generator;
+  Generator m_generator{m_settings.leftovers};
   int64_t m_errors = 0;
   int64_t m_warnings = 0;
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
@@ -103,7 +103,7 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
     TraceWriter() << "Error: Couldn't open workspace file " << entry << "\n" << Hint(TriedInTree(m_settings, entry));
     return false;
   }
-  CopyIfNewer(fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
+  CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
   const size_t slash = entry.rfind('/');
   m_workspace.relativeDir = slash == std::string::npos ? std::string() : entry.substr(0, slash);
   WorkspaceParser parser(m_workspace, fullPath);
@@ -147,7 +147,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
       if (project != m_workspace.projects.front()) names << " ";
       names << project->name;
     }
-    WriteIfChanged(names, m_workspace.name + ".projects");
+    WriteIfChanged(m_settings.leftovers, names, m_workspace.name + ".projects");
     for (const auto& project : m_workspace.projects) GenerateProject(*project);
     GenerateWorkspace();
   } else {
@@ -203,7 +203,7 @@ void WorkspaceRun::Prepare(const Project& project) {
   MakeDirectories(project);
   const std::string marker = PathJoin(project.rootDir, kMarkerFile);
   if (!m_prepared.contains(marker) &&
-      CopyIfNewer(marker, m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false)) {
+      CopyIfNewer(m_settings.leftovers, marker, m_settings.exportUntranslatedInclude + "/" + kMarkerFile, false)) {
     m_prepared.insert(marker);
   }
 }
@@ -244,7 +244,7 @@ void WorkspaceRun::Repackage(const Project& project) const {
   if (project.targetType == TargetType::UtilityProject) return;
   const std::string target = m_settings.platform + "/" + m_settings.config + "/" + project.name + "." +
                              std::string(TargetTypeExtension(project.targetType));
-  CopyIfNewer(PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
+  CopyIfNewer(m_settings.leftovers, PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
 }
 
 namespace {
@@ -422,17 +422,16 @@ void WaitForOtherBuilds(platform::FolderLock& folder) {
 
 }  // namespace
 
-bool RunWorkspace(ConfigSettings& settings) {
+bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   ScopeTimer timer;
   WriteOpening(settings);
   if (!CheckPathSyntax(settings)) return false;
   platform::FolderLock folder(".");
   const bool builds = settings.mode == RunMode::Build || settings.mode == RunMode::Compile;
   if (builds && !settings.translateOnly) WaitForOtherBuilds(folder);
-  // Left to the end of the process: to take a large workspace apart would cost a tenth of the run.
-  static auto& runs = *new std::vector<std::unique_ptr<WorkspaceRun>>;
-  WorkspaceRun& run = *runs.emplace_back(std::make_unique<WorkspaceRun>(settings));
-  return run.LoadAll() && run.Run(timer);
+  const auto run = std::make_shared<WorkspaceRun>(settings);
+  if (loaded) *loaded = run;
+  return run->LoadAll() && run->Run(timer);
 }
 
 }  // namespace qrex

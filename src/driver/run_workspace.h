@@ -1,6 +1,7 @@
 // The road of a whole run: loads what the settings name, checks it, and does what the mode says.
 #pragma once
 
+#include <memory>
 #include <string>
 
 #include "workspace/config_settings.h"
@@ -9,7 +10,9 @@ namespace qrex {
 
 // False for a failure to load, a missing configuration or a translation error; a run that counted compile errors is
 // true.
-bool RunWorkspace(ConfigSettings& settings);
+// `loaded`, unless null, gets all that the run made, for a caller that ends soon: to take a large workspace apart would
+// cost a tenth of the run.
+bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded = nullptr);
 
 // The deepest directory of the path that holds the marker, and the path relative to it.
 bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative);

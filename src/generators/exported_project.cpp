@@ -71,7 +71,7 @@ void WriteExportedProject(Project& project) {
   const std::string path =
       PathJoin3(project.settings->exportUntranslatedInclude, project.sourceDir, project.name + ".qrpj");
   CreateDirectories(path, false);
-  UpdateFile(out, path, ReadOnlyTarget::Replace);
+  UpdateFile(project.settings->leftovers, out, path, ReadOnlyTarget::Replace);
   ChangeReadOnly(path, true);
 }
 

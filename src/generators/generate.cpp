@@ -46,7 +46,7 @@ void Generator::Generate(const std::string& path, void (*write)(TextWriter&, Arg
   }
   MemoryTextWriter out;
   write(out, args...);
-  if (UpdateFile(out, path) != FileUpdate::Failed) m_upToDate.insert(path);
+  if (UpdateFile(m_leftovers, out, path) != FileUpdate::Failed) m_upToDate.insert(path);
 }
 
 void Generator::WriteGccProject(Project& project) {

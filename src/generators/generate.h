@@ -6,6 +6,7 @@
 #include <unordered_set>
 
 #include "generators/form.h"
+#include "text/files.h"
 #include "text/text_writer.h"
 #include "workspace/workspace.h"
 
@@ -15,6 +16,7 @@ namespace qrex {
 // Files land in the current directory, by UpdateFile: a file that cannot be written costs an "Error: " line.
 class Generator {
  public:
+  explicit Generator(LeftoverSweep& leftovers) : m_leftovers(leftovers) {}
   void WriteProject(Project& project, Form form);
   void WriteWorkspace(Workspace& workspace, Form form);
 
@@ -25,6 +27,7 @@ class Generator {
   void WriteGccProject(Project& project);
   void WriteGccWorkspace(const Workspace& workspace);
 
+  LeftoverSweep& m_leftovers;
   // Files of the project or workspace that are up to date. The gcc family has one form of its files: the second pass
   // leaves out what the first one wrote.
   std::unordered_set<std::string> m_upToDate;

@@ -99,14 +99,13 @@ void ExpansionContext::Str(bool wide, bool breakLines) {
   const TextRange raw = ReadParenBlock(m_scanner, indent);
   DropToScanner();
   const std::string text = ExpandPart(raw, indent);
-  const LineIndent savedIndent = m_outIndent;
-  m_outIndent = CurrentColumn();
+  const LineIndent column = CurrentColumn();
   const std::string opening = wide ? "L\"" : "\"";
   std::string literal = opening;
   bool broke = false;
   for (char c : text) {
     if (c == '\n' && breakLines) {
-      EmitGenerated(literal + "\\n\"\n");
+      EmitGenerated(literal + "\\n\"\n", column);
       literal = opening;
       broke = true;
     } else {
@@ -114,8 +113,7 @@ void ExpansionContext::Str(bool wide, bool breakLines) {
     }
   }
   literal += '"';
-  if (!broke || literal.size() >= 3) EmitGenerated(literal);
-  m_outIndent = savedIndent;
+  if (!broke || literal.size() >= 3) EmitGenerated(literal, column);
 }
 
 void ExpansionContext::Unstr() {
@@ -130,10 +128,7 @@ void ExpansionContext::Unstr() {
     PatchExpressionError(exception, "@unstr(", expansion, ")", m_tokenText.begin);
     throw;
   }
-  const LineIndent savedIndent = m_outIndent;
-  m_outIndent = CurrentColumn();
-  EmitGenerated(text);
-  m_outIndent = savedIndent;
+  EmitGenerated(text, CurrentColumn());
 }
 
 void ExpansionContext::Quote() {

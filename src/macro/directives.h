@@ -12,7 +12,7 @@ struct Directive {
     Kept,          // what stands ahead of it on its line goes out first: its output comes at that column
     Dropped,       // the blanks ahead of it are dropped
     DroppedWhole,  // as well as the rest of its line: it leaves no trace
-    OfItsOwn,
+    OfItsOwn,      // nothing of either: it settles and drops by itself
   };
   std::string_view word;
   Line line;

@@ -252,9 +252,9 @@ void ExpansionContext::CopySource(const TextRange& text, LineIndent indent, cons
 
 void ExpansionContext::DropTo(const char* position) { m_pendingBegin = position; }
 
-void ExpansionContext::EmitGenerated(std::string_view text) {
+void ExpansionContext::EmitGenerated(std::string_view text, LineIndent column) {
   CheckLength(text.size());
-  m_sink.WriteGenerated(text, AnchorForTemporary()->begin, m_outIndent);
+  m_sink.WriteGenerated(text, AnchorForTemporary()->begin, column);
 }
 
 void ExpansionContext::StripIndentation(int64_t width) {

@@ -54,7 +54,8 @@ class ExpansionContext {
   void FlushTo(const char* position);
   void DropTo(const char* position);
   void DropToScanner() { DropTo(m_scanner.begin); }
-  void EmitGenerated(std::string_view text);
+  void EmitGenerated(std::string_view text) { EmitGenerated(text, m_outIndent); }
+  void EmitGenerated(std::string_view text, LineIndent column);  // where its lines but the first begin
   void CheckPart(const TextRange& text) const {
     if (m_world.nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
     if (m_world.nesting == 0) m_world.parts = 0;

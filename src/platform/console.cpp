@@ -5,6 +5,7 @@
 #include <unistd.h>
 
 #include <algorithm>
+#include <boost/locale/utf.hpp>
 #include <cerrno>
 #include <chrono>
 
@@ -12,23 +13,12 @@ namespace qrex::platform {
 
 namespace {
 
-// Length of the well-formed sequence at the head, 0 when there is none (the Unicode Standard, table 3-7).
+// Length of the well-formed sequence at the head, 0 when there is none.
 size_t SequenceLength(std::string_view text) {
-  auto at = [&](size_t i) { return static_cast<unsigned char>(text[i]); };
-  const unsigned char lead = at(0);
-  if (lead < 0x80) return 1;
-  const size_t length = lead >= 0xC2 && lead <= 0xDF   ? 2
-                        : (lead & 0xF0) == 0xE0        ? 3
-                        : lead >= 0xF0 && lead <= 0xF4 ? 4
-                                                       : 0;
-  if (length == 0 || text.size() < length) return 0;
-  for (size_t i = 1; i < length; ++i) {
-    if ((at(i) & 0xC0) != 0x80) return 0;
-  }
-  const unsigned char second = at(1);
-  const bool isMalformed = (lead == 0xE0 && second < 0xA0) || (lead == 0xED && second > 0x9F) ||
-                           (lead == 0xF0 && second < 0x90) || (lead == 0xF4 && second > 0x8F);
-  return isMalformed ? 0 : length;
+  namespace utf = boost::locale::utf;
+  const char* at = text.data();
+  const utf::code_point decoded = utf::utf_traits<char>::decode(at, text.data() + text.size());
+  return utf::is_valid_codepoint(decoded) ? static_cast<size_t>(at - text.data()) : 0;
 }
 
 }  // namespace

@@ -1,9 +1,9 @@
 #include "platform/system.h"
 
 #include <malloc.h>
+#include <pthread.h>
 #include <sys/mman.h>
 #include <sys/wait.h>
-#include <ucontext.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -21,17 +21,6 @@
 #include "platform/console.h"
 #include "platform/file_system.h"
 
-#if defined(__has_feature)
-#if __has_feature(address_sanitizer)
-#define QREX_ADDRESS_SANITIZER
-#endif
-#elif defined(__SANITIZE_ADDRESS__)
-#define QREX_ADDRESS_SANITIZER
-#endif
-#ifdef QREX_ADDRESS_SANITIZER
-#include <sanitizer/common_interface_defs.h>
-#endif
-
 namespace qrex::platform {
 
 namespace {
@@ -42,30 +31,6 @@ timespec Now(clockid_t clock) {
   timespec now;
   clock_gettime(clock, &now);
   return now;
-}
-
-struct StackRun {
-  const std::function<void()>& body;
-  std::exception_ptr failure;
-  const void* outerStack = nullptr;
-  size_t outerSize = 0;
-};
-
-StackRun* stackRun = nullptr;  // what RunBody is to run
-
-void RunBody() {
-  StackRun& run = *stackRun;
-#ifdef QREX_ADDRESS_SANITIZER
-  __sanitizer_finish_switch_fiber(nullptr, &run.outerStack, &run.outerSize);
-#endif
-  try {
-    run.body();
-  } catch (...) {
-    run.failure = std::current_exception();
-  }
-#ifdef QREX_ADDRESS_SANITIZER
-  __sanitizer_start_switch_fiber(nullptr, run.outerStack, run.outerSize);
-#endif
 }
 
 }  // namespace
@@ -229,28 +194,34 @@ LocalTime CurrentLocalTime() {
           static_cast<int>(now.tv_nsec / 1000000)};
 }
 
+// The stack of a thread of its own. It is mapped here, as the library would have all of its memory promised at once.
 void RunOnStack(size_t bytes, const std::function<void()>& body) {
   void* const stack =
       mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
-  if (stack == MAP_FAILED) return body();  // no room for it: the stack at hand serves
+  if (stack == MAP_FAILED) return body();  // no room for it: the stack of the caller serves
   mprotect(stack, 4096, PROT_NONE);        // what overflows it ends here
-  StackRun run{body, nullptr};
-  ucontext_t here, there;
-  getcontext(&there);
-  there.uc_stack.ss_sp = stack;
-  there.uc_stack.ss_size = bytes;
-  there.uc_link = &here;
-  stackRun = &run;
-  makecontext(&there, RunBody, 0);
-#ifdef QREX_ADDRESS_SANITIZER
-  void* fakeStack = nullptr;
-  __sanitizer_start_switch_fiber(&fakeStack, stack, bytes);
-#endif
-  swapcontext(&here, &there);
-#ifdef QREX_ADDRESS_SANITIZER
-  __sanitizer_finish_switch_fiber(fakeStack, nullptr, nullptr);
-#endif
+  struct Run {
+    const std::function<void()>& body;
+    std::exception_ptr failure;
+  } run{body, nullptr};
+  const auto start = [](void* argument) -> void* {
+    Run& run = *static_cast<Run*>(argument);
+    try {
+      run.body();
+    } catch (...) {
+      run.failure = std::current_exception();
+    }
+    return nullptr;
+  };
+  pthread_attr_t attributes;
+  pthread_attr_init(&attributes);
+  pthread_attr_setstack(&attributes, stack, bytes);
+  pthread_t thread;
+  const bool isRunning = pthread_create(&thread, &attributes, start, &run) == 0;
+  pthread_attr_destroy(&attributes);
+  if (isRunning) pthread_join(thread, nullptr);
   munmap(stack, bytes);
+  if (!isRunning) return body();
   if (run.failure) std::rethrow_exception(run.failure);
 }
 
@@ -266,6 +237,7 @@ void TuneHeap() {
   constexpr int kFirstStep = 256 << 20, kStep = 16 << 20;
   constexpr uintptr_t kLargePage = 2 << 20;
   [[maybe_unused]] static void* volatile gap;  // kept; volatile, or the compiler would leave the call out
+  mallopt(M_ARENA_MAX, 1);                     // for all threads
   mallopt(M_TRIM_THRESHOLD, 4 * kFirstStep - 1);
   mallopt(M_MMAP_THRESHOLD, 32 << 20);
   mallopt(M_TOP_PAD, kFirstStep);

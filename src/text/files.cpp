@@ -47,15 +47,20 @@ bool FileExists(const std::string& path) { return platform::CanRead(Checked(path
 bool FileLookup::Exists(const std::string& path) {
   const size_t slash = path.rfind('/');
   const size_t nameBegin = slash == std::string::npos ? 0 : slash + 1;
-  const std::string_view folder(path.data(), nameBegin);
-  auto files = m_plainFiles.find(folder);
-  if (files == m_plainFiles.end()) {
-    files = m_plainFiles.try_emplace(std::string(folder)).first;
-    std::vector<std::string> names = platform::PlainFileNames(Checked(files->first));
-    files->second.reserve(names.size());
-    for (std::string& name : names) files->second.insert(std::move(name));
-  }
-  return files->second.contains(std::string_view(path).substr(nameBegin)) || FileExists(path);
+  const Directory& directory = DirectoryOf(std::string_view(path).substr(0, nameBegin));
+  return directory.index.contains(std::string_view(path).substr(nameBegin)) || FileExists(path);
+}
+
+const FileLookup::Directory& FileLookup::DirectoryOf(std::string_view path) {
+  if (m_last && m_last->path == path) return *m_last;
+  const auto found = m_byPath.find(path);
+  if (found != m_byPath.end()) return *(m_last = found->second);
+  std::vector<std::string> names = platform::PlainFileNames(Checked(std::string(path)));
+  Directory& directory = m_directories.emplace_back(
+      Directory{std::string(path), std::move(names), std::pmr::unordered_set<std::string_view>(&m_memory)});
+  directory.index.insert(directory.plainFiles.begin(), directory.plainFiles.end());
+  m_byPath.emplace(directory.path, &directory);
+  return *(m_last = &directory);
 }
 
 bool DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }
@@ -81,18 +86,6 @@ bool CreateEmptyFile(const std::string& path, bool keepExisting) {
   return platform::MakeEmptyFile(Checked(path), keepExisting);
 }
 
-namespace {
-
-std::unordered_set<std::string> sweptFolders;  // in which no file of a killed run is left; with a slash at the end
-
-bool MakeDirectory(const std::string& path) {
-  if (!platform::MakeDirectory(path)) return false;
-  sweptFolders.insert(path + "/");
-  return true;
-}
-
-}  // namespace
-
 void CreateDirectories(const std::string& path, bool includeLast) {
   const size_t lastSlash = Checked(path).rfind('/');
   const std::string deepest = includeLast ? path : path.substr(0, lastSlash == std::string::npos ? 0 : lastSlash);
@@ -100,14 +93,14 @@ void CreateDirectories(const std::string& path, bool includeLast) {
   if (deepest.empty() || platform::Stat(deepest, info)) return;
   // Mostly just the last one is missing: from there back to one that can be made, then forth.
   size_t end = deepest.size();
-  while (!MakeDirectory(deepest.substr(0, end))) {
+  while (!platform::MakeDirectory(deepest.substr(0, end))) {
     const size_t slash = deepest.rfind('/', end - 1);
     if (slash == std::string::npos || slash == 0) break;
     end = slash;
   }
   while (end < deepest.size()) {
     end = std::min(deepest.find('/', end + 1), deepest.size());
-    MakeDirectory(deepest.substr(0, end));
+    platform::MakeDirectory(deepest.substr(0, end));
   }
 }
 
@@ -235,15 +228,18 @@ bool IsLeftover(std::string_view name) {
 
 }  // namespace
 
+void LeftoverSweep::Beside(const std::string& path) {
+  const auto [folder, isNew] = m_swept.insert(path.substr(0, path.rfind('/') + 1));
+  if (!isNew) return;
+  for (const std::string& name : platform::PlainFileNames(*folder)) {
+    if (IsLeftover(name)) platform::RemoveFile(*folder + name);
+  }
+}
+
 std::string BesidePath(const std::string& path) {
   static const std::string kMarkOfThisProcess =
       std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
   const std::string folder = path.substr(0, path.rfind('/') + 1);
-  if (sweptFolders.insert(folder).second) {
-    for (const std::string& name : platform::PlainFileNames(folder)) {
-      if (IsLeftover(name)) platform::RemoveFile(folder + name);
-    }
-  }
   const std::string name = path.substr(folder.size());
   if (name.size() + kMarkOfThisProcess.size() <= platform::kLongestName) return path + kMarkOfThisProcess;
   return folder + std::to_string(std::hash<std::string>()(name)) + kMarkOfThisProcess;

@@ -4,7 +4,9 @@
 
 #include <cstdint>
 #include <cstdio>
+#include <deque>
 #include <memory>
+#include <memory_resource>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -27,11 +29,17 @@ class FileLookup {
   bool Exists(const std::string& path);
 
  private:
-  struct Hash : std::hash<std::string_view> {
-    using is_transparent = void;
+  struct Directory {
+    std::string path;  // with a slash at the end
+    std::vector<std::string> plainFiles;
+    std::pmr::unordered_set<std::string_view> index;  // of these
   };
-  using Names = std::unordered_set<std::string, Hash, std::equal_to<>>;
-  std::unordered_map<std::string, Names, Hash, std::equal_to<>> m_plainFiles;  // by directory
+  const Directory& DirectoryOf(std::string_view path);
+
+  std::pmr::monotonic_buffer_resource m_memory;  // of the indexes
+  std::deque<Directory> m_directories;
+  std::unordered_map<std::string_view, const Directory*> m_byPath;
+  const Directory* m_last = nullptr;  // asked for
 };
 bool DeleteFile(const std::string& path);
 // A program stays executable; a read-only target is replaced like any other.
@@ -63,8 +71,17 @@ bool ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
 bool LoadStream(std::string& out, const std::string& path);  // as LoadText with folding, also from a pipe or device
 
+// Removes what killed runs left where they were writing. One for each run: it looks through each folder once.
+class LeftoverSweep {
+ public:
+  void Beside(const std::string& path);  // to be called ahead of writing a file
+
+ private:
+  std::unordered_set<std::string> m_swept;  // folders, with a slash at the end
+};
+
 // The name of this process's own under which a file is written before it takes the place of `path`; where that name
-// would be too long, a number stands for the file's. The first call for a folder removes what killed runs left there.
+// would be too long, a number stands for the file's.
 std::string BesidePath(const std::string& path);
 // Replaces the file as a whole: written beside, then renamed, so that a half-written file never stands under `path`.
 // Raises FileException. A read-only target fails with code 5, unless the flag is the caller's own: it was cleared, but

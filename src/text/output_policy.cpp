@@ -75,6 +75,7 @@ void GeneratedFile::Spill() {
   Try([this] {
     if (!m_isSpilled) {
       CreateDirectories(m_path, false);
+      m_leftovers.Beside(m_path);
       m_besidePath = BesidePath(m_path);
       if (!m_beside.Open(m_besidePath, FileMode::WriteBinary)) throw FileException(m_path);
       m_isSpilled = true;
@@ -97,7 +98,10 @@ std::string GeneratedFile::Text() {
 }
 
 void GeneratedFile::Commit() {
-  if (!m_isSpilled && !m_failure) return ReplaceFile(m_path, InMemory(), ReadOnlyTarget::Replace);
+  if (!m_isSpilled && !m_failure) {
+    m_leftovers.Beside(m_path);
+    return ReplaceFile(m_path, InMemory(), ReadOnlyTarget::Replace);
+  }
   Spill();
   Try([this] { m_beside.Close(); });
   RaiseFailure();
@@ -105,14 +109,36 @@ void GeneratedFile::Commit() {
   m_isSpilled = false;
 }
 
-FileUpdate UpdateFile(MemoryTextWriter& writer, const std::string& path, ReadOnlyTarget readOnly) {
+namespace {
+
+// Whether the bytes are this text, each line feed of which may stand as CR LF or CR.
+bool HoldText(std::string_view bytes, std::string_view text) {
+  if (text.find('\r') != text.npos) return false;
+  while (!text.empty()) {
+    const size_t length = std::min(text.find('\n'), text.size());
+    if (bytes.substr(0, length) != text.substr(0, length)) return false;
+    bytes.remove_prefix(length);
+    text.remove_prefix(length);
+    if (text.empty()) break;
+    if (bytes.empty() || (bytes.front() != '\r' && bytes.front() != '\n')) return false;
+    bytes.remove_prefix(bytes.starts_with("\r\n") ? 2 : 1);
+    text.remove_prefix(1);
+  }
+  return bytes.empty();
+}
+
+}  // namespace
+
+FileUpdate UpdateFile(LeftoverSweep& leftovers, MemoryTextWriter& writer, const std::string& path,
+                      ReadOnlyTarget readOnly) {
   const std::string text = writer.TakeText(false);
   std::string old;
-  if (LoadText(old, path, true) && old == text) {
+  if (ReadWholeFile(old, path) && HoldText(old, text)) {
     TraceWriter() << "Skipping " << path << "\n";
     return FileUpdate::Skipped;
   }
   TraceWriter() << "Writing " << path << "\n";
+  leftovers.Beside(path);
   try {
     ReplaceFile(path, WithCarriageReturns(text), readOnly);
   } catch (const FileException& exception) {
@@ -122,8 +148,8 @@ FileUpdate UpdateFile(MemoryTextWriter& writer, const std::string& path, ReadOnl
   return FileUpdate::Written;
 }
 
-int WriteIfChanged(MemoryTextWriter& writer, const std::string& path) {
-  return UpdateFile(writer, path) == FileUpdate::Written ? 1 : 0;
+int WriteIfChanged(LeftoverSweep& leftovers, MemoryTextWriter& writer, const std::string& path) {
+  return UpdateFile(leftovers, writer, path) == FileUpdate::Written ? 1 : 0;
 }
 
 void ChangeReadOnly(const std::string& path, bool readOnly) {
@@ -131,7 +157,7 @@ void ChangeReadOnly(const std::string& path, bool readOnly) {
   TraceWriter() << "Failure " << (readOnly ? "setting" : "clearing") << " read only status of file " << path << "\n";
 }
 
-bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly) {
+bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::string& to, bool readOnly) {
   CreateDirectories(to, false);
   auto fail = [] {
     TraceWriter() << "...Copy file failed\n";
@@ -145,6 +171,7 @@ bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly) 
     if (exists && readOnly && !target.isReadOnly) ChangeReadOnly(to, true);  // a run was killed behind its copy
     return true;
   }
+  leftovers.Beside(to);
   ChangeReadOnly(to, false);
   if (!CopyFile(from, to, false)) return fail();
   TouchFile(to, false);

@@ -14,9 +14,10 @@ namespace qrex {
 // Writes the text with CR LF line ends unless the file holds it already (line ends folded): "Skipping " or "Writing "
 // and the path. A file that cannot be written costs an "Error: " line.
 enum class FileUpdate { Skipped, Written, Failed };
-FileUpdate UpdateFile(MemoryTextWriter& writer, const std::string& path,
+FileUpdate UpdateFile(LeftoverSweep& leftovers, MemoryTextWriter& writer, const std::string& path,
                       ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
-int WriteIfChanged(MemoryTextWriter& writer, const std::string& path);  // the same: 1 when written, else 0
+// The same: 1 when written, else 0.
+int WriteIfChanged(LeftoverSweep& leftovers, MemoryTextWriter& writer, const std::string& path);
 
 // The text with each line feed as CR LF: how every generated file stands on disk.
 std::string WithCarriageReturns(std::string_view text);
@@ -26,7 +27,7 @@ std::string WithCarriageReturns(std::string_view text);
 // memory. Writers flush in their destructors, so Write never raises: what it could not write fails Text and Commit.
 class GeneratedFile : public IOutputStream {
  public:
-  explicit GeneratedFile(std::string path) : m_path(std::move(path)) {}
+  GeneratedFile(LeftoverSweep& leftovers, std::string path) : m_leftovers(leftovers), m_path(std::move(path)) {}
   ~GeneratedFile() override;
   void Write(const void* data, size_t length) override {
     WriteIndented({static_cast<const char*>(data), length}, 0, false);
@@ -44,6 +45,7 @@ class GeneratedFile : public IOutputStream {
   std::string_view InMemory() const { return {m_buffer.data(), m_used}; }
   char* MakeRoom(size_t length);  // behind what is in memory; the length is that of a part of a line
 
+  LeftoverSweep& m_leftovers;
   const std::string m_path;
   boost::container::vector<char> m_buffer;  // grows without being cleared first
   size_t m_used = 0;
@@ -54,7 +56,7 @@ class GeneratedFile : public IOutputStream {
 };
 
 // Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time.
-bool CopyIfNewer(const std::string& from, const std::string& to, bool readOnly);
+bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::string& to, bool readOnly);
 
 // As SetReadOnly; an existing file that refuses gets a "Failure setting/clearing read only status" line.
 void ChangeReadOnly(const std::string& path, bool readOnly);

@@ -41,12 +41,16 @@ struct Compiler {
   bool namesLibraries = false;          // by -soname
 };
 
-// What the compilers of a family, or of a part of it, share.
+// What the compilers of a family, or of a part of it, share. A tool that a row names itself stays.
+constexpr void SetIfEmpty(std::string_view& field, std::string_view shared) {
+  if (field.empty()) field = shared;
+}
+
 constexpr Compiler VisualStudio(Compiler row) {
   row.family = CompilerFamily::VisualCpp;
-  row.compile = "cl /c";
-  row.link = "link.exe";
-  row.archive = "lib.exe";
+  SetIfEmpty(row.compile, "cl /c");
+  SetIfEmpty(row.link, "link.exe");
+  SetIfEmpty(row.archive, "lib.exe");
   row.compilesResources = row.embedsManifest = row.kind != CompilerKind::vc6;
   row.buildsWithMSBuild = row.format == ProjectFormat::Vcxproj;
   return row;
@@ -54,9 +58,8 @@ constexpr Compiler VisualStudio(Compiler row) {
 
 constexpr Compiler GccLike(Compiler row) {
   row.family = CompilerFamily::Gcc;
-  row.format = ProjectFormat::Make;
-  row.compile = "gcc-4 -c";
-  row.archive = "ar rcs";
+  SetIfEmpty(row.compile, "gcc-4 -c");
+  SetIfEmpty(row.archive, "ar rcs");
   row.keepsRawSwitches = true;
   row.buildsWithMSBuild = true;
   return row;

@@ -7,6 +7,7 @@
 
 #include "macro/mpfw_parser.h"
 #include "platform/system.h"
+#include "text/files.h"
 #include "workspace/compilers.h"
 
 namespace qrex {
@@ -46,6 +47,7 @@ struct ConfigSettings {
   bool compilableText = false;
   RunMode mode = RunMode::Build;
   std::map<std::string, PlatformEnvironment> platformEnvironments;
+  mutable LeftoverSweep leftovers;  // whoever may read the settings may write files
 
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };

@@ -17,7 +17,8 @@ namespace {
 constexpr size_t kMaxNesting = 1000;
 
 bool HoldsWildcard(const LexToken& token) {
-  return token.kind == kDoubleQuoted && token.text.View().find_first_of("*?") != std::string_view::npos;
+  const std::string_view text = token.text.View();
+  return token.kind == kDoubleQuoted && (text.find('*') != text.npos || text.find('?') != text.npos);
 }
 
 }  // namespace
@@ -203,12 +204,13 @@ ProjectFolder& ProjectParser::FolderNamed(ProjectFolder& parent, const std::stri
 
 // A file that is named again stays in its first folder.
 ProjectFile& ProjectParser::AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName) {
-  std::unique_ptr<ProjectFile>& slot = m_project.filesByPath[path];
-  if (slot) return *slot;
-  slot = std::make_unique<ProjectFile>();
-  ProjectFile& file = *slot;
+  const auto place = m_project.filesByPath.lower_bound(path);
+  if (place != m_project.filesByPath.end() && place->first == path) return *place->second;
+  auto made = std::make_unique<ProjectFile>();
+  ProjectFile& file = *made;
   file.project = &m_project;
   file.path = path;
+  m_project.filesByPath.emplace_hint(place, file.path, std::move(made));
   file.listedAt = m_entry;
   file.name = displayName;
   if (!StemOf(displayName, file.stem)) file.stem = std::string(FileNameOf(displayName));

@@ -96,7 +96,8 @@ void Project::CollectFiles() {
   filesByName.clear();
   AddFoldersOf(rootFolder, folders);
 
-  std::unordered_map<std::string_view, ProjectFile*> sourcesByStem;
+  std::pmr::monotonic_buffer_resource memory;
+  std::pmr::unordered_map<std::string_view, ProjectFile*> sourcesByStem(&memory);
   sourcesByStem.reserve(filesByPath.size());
   filesByName.reserve(filesByPath.size());
   std::vector<ProjectFile*> creators, sources, assembler;  // creators: the last one met comes first

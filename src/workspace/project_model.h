@@ -4,6 +4,7 @@
 #include <functional>
 #include <map>
 #include <memory>
+#include <memory_resource>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -114,10 +115,11 @@ struct Project {
   std::vector<std::string> subprojects;  // project paths relative to the tree
   std::vector<std::string> toolFiles;
   bool filesCollected = false;
-  std::vector<ProjectFolder*> folders;  // subfolders first, the root last
-  std::vector<ProjectFile*> files;      // in build order
-  std::unordered_map<std::string_view, ProjectFile*> filesByName;
-  std::map<std::string, std::unique_ptr<ProjectFile>> filesByPath;
+  std::vector<ProjectFolder*> folders;             // subfolders first, the root last
+  std::vector<ProjectFile*> files;                 // in build order
+  std::pmr::monotonic_buffer_resource nodeMemory;  // of the two maps, which only grow
+  std::pmr::unordered_map<std::string_view, ProjectFile*> filesByName{&nodeMemory};
+  std::pmr::map<std::string_view, std::unique_ptr<ProjectFile>> filesByPath{&nodeMemory};  // the path is the file's own
   std::string mangledProjDir;
 };
 

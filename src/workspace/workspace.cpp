@@ -177,6 +177,7 @@ void Workspace::SyncProjectGuids() {
     guids.clear();
   }
   for (const auto& project : projects) guids[project->name] = project->guid;
+  settings.leftovers.Beside(kGuidFile);
   try {
     ReplaceFile(kGuidFile, GuidBytes(guids));
   } catch (const FileException&) {

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <memory>
+#include <memory_resource>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -29,7 +30,8 @@ class Workspace {
   std::string name;
   std::string rootDir;
   std::string relativeDir;
-  std::unordered_map<std::string_view, ProjectFile*> fileMap;
+  std::pmr::monotonic_buffer_resource nodeMemory;  // of fileMap, which only grows
+  std::pmr::unordered_map<std::string_view, ProjectFile*> fileMap{&nodeMemory};
 
  private:
   static constexpr int kMaxLoadDepth = 1000;

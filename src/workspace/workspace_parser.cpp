@@ -61,7 +61,8 @@ void WorkspaceParser::ParseNested(const std::string& path) {
     throw LexScannerException("Couldn't open workspace file " + path, previous)
         .WithHint(TriedInTree(m_workspace.settings, path));
   }
-  CopyIfNewer(fullPath, m_workspace.settings.exportUntranslatedInclude + "/" + path, true);
+  CopyIfNewer(m_workspace.settings.leftovers, fullPath, m_workspace.settings.exportUntranslatedInclude + "/" + path,
+              true);
   for (const WorkspaceParser* open = this; open; open = open->m_outer) {
     if (open->m_path == fullPath) throw LexScannerException("Workspace file includes itself : " + path, previous);
   }

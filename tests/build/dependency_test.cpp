@@ -3,7 +3,8 @@
 #include "build/dependency_file.h"
 #include "build/staleness.h"
 #include "driver/run_workspace.h"
-#include "workspace/workspace_fixture.h"
+#include "message_of.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
@@ -26,24 +27,15 @@ std::string Entry(const std::string& path, int64_t time, const std::vector<std::
 
 const std::string kNoRegistrations("\0\0\0", 3);  // the end of the files, and both registries
 
-class DependencyTest : public WorkspaceTest {
+class DependencyTest : public WorldTest {
  protected:
   DependencyTest() {
     settings.mode = RunMode::Build;
-    Write("tree/lib/src/lib.qrpj",
-          "$TARGET_TYPE = \"Static Library\" $ROOT_TO_PROJDIR = \"lib\" qrex config { \"Debug|x64\" } { \"l.h\" }");
+    WriteProject("lib", "Static Library", "qrex { \"l.h\" }");
     WriteProject("app", "qrex { \"a.h\" \"b.h\" \"c.h\" \"x.cpp\" \"y.cpp\" \"app.cpp\" }");
-    workspace->LoadProject("app/src/app.qrpj");
-    workspace->LoadProject("lib/src/lib.qrpj");
-    EXPECT_TRUE(workspace->CheckFileReferences()) << trace;
+    EXPECT_TRUE(Load({"app", "lib"}) && workspace->CheckFileReferences()) << trace;
     StartBuild();
   }
-  void StartBuild() {
-    builder = std::make_unique<ProjectBuilder>(settings, App(), *App().configs[0]);
-    trace.clear();
-  }
-  Project& App() { return *workspace->projects[0]; }
-  ScannedFile& File(const std::string& path) { return builder->GetScannedFile(*workspace->FindFile(path)); }
   void WriteDependencies(const std::string& payload) { WriteCheckedFile(0x2AEF78F1, payload, "dep"); }
 
   // Gives a file the time of so many ticks of 100 ns behind a moment of the past.
@@ -70,8 +62,6 @@ class DependencyTest : public WorkspaceTest {
     return names;
   }
 
-  std::unique_ptr<ProjectBuilder> builder;
-
  private:
   static inline const auto s_moment = std::filesystem::file_time_type::clock::now() - std::chrono::hours(1);
 };
@@ -90,9 +80,9 @@ TEST_F(DependencyTest, Bytes) {
   EXPECT_TRUE(LoadDependencyFile(*builder, "dep"));
   EXPECT_TRUE(builder->dependencyFileLoaded);
   EXPECT_FALSE(builder->registerMap.dirty || builder->unregisterMap.dirty);
-  EXPECT_EQ(&File("lib/l.h"), File("app/a.h").imports.at(0));
-  EXPECT_EQ(0x0102030405060708, File("app/a.h").translationTime);
-  EXPECT_TRUE(File("app/a.h").hasDeclarations && !File("app/b.h").hasDeclarations);
+  EXPECT_EQ(&Scanned("lib/l.h"), Scanned("app/a.h").imports.at(0));
+  EXPECT_EQ(0x0102030405060708, Scanned("app/a.h").translationTime);
+  EXPECT_TRUE(Scanned("app/a.h").hasDeclarations && !Scanned("app/b.h").hasDeclarations);
   EXPECT_EQ(payload, DependencyPayload(*builder));
   builder->registerMap.dirty = true;
   SaveDependencyFile(*builder, "deep/er/dep");
@@ -111,7 +101,7 @@ TEST_F(DependencyTest, DamagedFiles) {
   auto assertAbsent = [&](const std::string& expected) {
     StartBuild();
     EXPECT_FALSE(LoadDependencyFile(*builder, "dep"));
-    EXPECT_EQ(expected, trace);
+    EXPECT_EQ(expected, TakeTrace());
     EXPECT_FALSE(builder->dependencyFileLoaded);
     EXPECT_EQ(kNoRegistrations, DependencyPayload(*builder));
   };
@@ -180,33 +170,29 @@ TEST_F(DependencyTest, Staleness) {
 TEST_F(DependencyTest, LatestTimes) {
   const int64_t moment = Moment();
   WriteFiles({{"a.h", {1, 20}}, {"b.h", {2, 10}}, {"c.h", {3, -1}}});
-  File("app/b.h").imports = {&File("app/a.h")};
-  File("app/a.h").imports = {&File("app/b.h")};  // as no run writes it
-  EXPECT_EQ(moment + 2, LatestSourceTime(*builder, File("app/b.h")));
-  EXPECT_EQ(moment + 20, LatestTargetTime(*builder, File("app/b.h")));
+  Scanned("app/b.h").imports = {&Scanned("app/a.h")};
+  Scanned("app/a.h").imports = {&Scanned("app/b.h")};  // as no run writes it
+  EXPECT_EQ(moment + 2, LatestSourceTime(*builder, Scanned("app/b.h")));
+  EXPECT_EQ(moment + 20, LatestTargetTime(*builder, Scanned("app/b.h")));
   std::filesystem::remove("tree/app/b.h");
-  EXPECT_EQ(moment + 2, LatestSourceTime(*builder, File("app/b.h")));  // looked up once
-  try {
-    LatestTargetTime(*builder, File("app/c.h"));
-    FAIL();
-  } catch (const LexScannerException& exception) {
-    EXPECT_EQ("Error - file not translated by qrex : app/c.h", exception.message);
-  }
+  EXPECT_EQ(moment + 2, LatestSourceTime(*builder, Scanned("app/b.h")));  // looked up once
+  EXPECT_EQ("Error - file not translated by qrex : app/c.h",
+            MessageOf([&] { LatestTargetTime(*builder, Scanned("app/c.h")); }));
 }
 
 TEST_F(DependencyTest, RegisteringFiles) {
-  ScannedFile& x = File("app/x.cpp");
-  x.imports = {&File("app/a.h"), &File("app/b.h"), &File("app/c.h"), &File("lib/l.h")};
-  File("app/b.h").file.pairedSource = &File("app/y.cpp").file;
-  File("app/c.h").file.pairedSource = &x.file;
+  ScannedFile& x = Scanned("app/x.cpp");
+  x.imports = {&Scanned("app/a.h"), &Scanned("app/b.h"), &Scanned("app/c.h"), &Scanned("lib/l.h")};
+  Scanned("app/b.h").file.pairedSource = &Scanned("app/y.cpp").file;
+  Scanned("app/c.h").file.pairedSource = &x.file;
   MarkRegistered(x);
-  EXPECT_TRUE(x.registered && File("app/a.h").registered && File("app/c.h").registered);
-  EXPECT_FALSE(File("app/b.h").registered || File("lib/l.h").registered);
-  ScannedFile& y = File("app/y.cpp");
-  y.imports = {&File("app/b.h")};
+  EXPECT_TRUE(x.registered && Scanned("app/a.h").registered && Scanned("app/c.h").registered);
+  EXPECT_FALSE(Scanned("app/b.h").registered || Scanned("lib/l.h").registered);
+  ScannedFile& y = Scanned("app/y.cpp");
+  y.imports = {&Scanned("app/b.h")};
   y.registered = true;
   MarkRegistered(y);
-  EXPECT_FALSE(File("app/b.h").registered);
+  EXPECT_FALSE(Scanned("app/b.h").registered);
 
   DeclarationRegistry registry(true);
   registry.Update("x.cpp", {});

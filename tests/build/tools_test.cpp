@@ -4,35 +4,21 @@
 
 #include "build/tools.h"
 
-#include <gtest/gtest.h>
-#include <unistd.h>
-
-#include <filesystem>
-
 #include "build/run_command.h"
 #include "build/tool_output.h"
-#include "text/files.h"
-#include "text/numbers.h"
+#include "message_of.h"
 #include "text/paths.h"
-#include "text/trace.h"
 #include "translator/file/translate_file.h"
 #include "workspace/switch_blocks.h"
+#include "world_fixture.h"
 
 namespace qrex {
 
 namespace {
 
-class ToolsTest : public ::testing::Test, public TraceHook {
+class ToolsTest : public WorldTest {
  protected:
-  ToolsTest() : m_start(std::filesystem::current_path()), m_path(std::getenv("PATH")) {
-    m_folder = std::filesystem::path(::testing::TempDir()) /
-               ("tools." + std::to_string(getpid()) + ::testing::UnitTest::GetInstance()->current_test_info()->name());
-    std::filesystem::remove_all(m_folder);
-    std::filesystem::create_directories(m_folder);
-    std::filesystem::current_path(m_folder);
-    SetTraceHook(this);
-    settings.virtualTree = {"tree"};
-    settings.exportLib = "lib";
+  ToolsTest() : m_path(std::getenv("PATH")) {
     settings.platformEnvironments["x64"] = {"tools;/usr/bin;/bin", "", ""};
     ApplyEnvironment(settings.platformEnvironments["x64"]);
     for (const char* tool :
@@ -43,75 +29,36 @@ class ToolsTest : public ::testing::Test, public TraceHook {
               "[ ! -f say ] || cat say\n[ ! -f status ] || exit $(cat status)\n");
     }
   }
-  ~ToolsTest() override {
-    SetTraceHook(nullptr);
-    builder.reset();
-    setenv("PATH", m_path.c_str(), 1);
-    std::filesystem::current_path(m_start);
-    std::filesystem::remove_all(m_folder);
-  }
-  void OnTrace(std::string_view text) override { trace += text; }
+  ~ToolsTest() override { setenv("PATH", m_path.c_str(), 1); }
 
-  static void AddFile(const std::string& path, const std::string& text) {
-    CreateDirectories(path, false);
-    ReplaceFile(path, text);
-  }
   static void AddTool(const std::string& name, const std::string& script) {
-    AddFile("tools/" + name, "#!/bin/sh\n" + script);
+    Write("tools/" + name, "#!/bin/sh\n" + script);
     std::filesystem::permissions("tools/" + name, std::filesystem::perms::owner_all);
   }
-  std::string TakeLog() {
-    std::string log;
-    LoadText(log, "log", true);
+  static std::string TakeLog() {
+    const std::string log = FileExists("log") ? ReadText("log") : "";
     DeleteFile("log");
     return log;
   }
-
-  Project& AddProject(const std::string& name, TargetType type, const std::vector<std::string>& subprojects = {}) {
-    Project& project = *workspace.projects.emplace_back(std::make_unique<Project>(workspace));
-    project.name = name;
-    project.targetType = type;
-    project.usesQrex = true;
-    project.rootDir = "tree";
-    project.rootToProjDir = name;
-    project.sourceDir = name + "/src";
-    for (const std::string& subproject : subprojects) project.subprojects.push_back(subproject + ".qrpj");
-    ProjectConfig& config = *project.configs.emplace_back(std::make_unique<ProjectConfig>());
-    config.name = "Debug";
-    config.platform = "x64";
-    return project;
+  // The project `app`, of sources, and of what it depends on.
+  Project& AddApp(std::string_view targetType, const std::string& sources, const std::string& statements = {}) {
+    return AddProject("app", targetType, statements + " qrex { \"src\" { " + sources + " } }");
   }
-  static ProjectFile& AddSource(Project& project, const std::string& name, const std::string& text = {}) {
-    const std::string path = project.sourceDir + "/" + name;
-    auto& file = project.filesByPath[path] = std::make_unique<ProjectFile>();
-    file->project = &project;
-    file->path = path;
-    file->name = name;
-    StemOf(name, file->stem);
-    file->kind = FileKindOf(name.substr(file->stem.size() + 1));
-    project.rootFolder.files.push_back(file.get());
-    AddFile("tree/" + path, text);
-    return *file;
+  ScannedFile& Source(const std::string& name) {
+    return builder->GetScannedFile(*App().filesByPath.at("app/src/" + name));
   }
-  // A builder of the first project, with its files.
+  // A builder of the project, with its files.
   ProjectBuilder& Builder(CompilerKind compiler) {
     settings.compiler = compiler;
-    Project& project = *workspace.projects.front();
-    project.CollectFiles();
-    builder = std::make_unique<ProjectBuilder>(settings, project, *project.configs.front());
-    for (ProjectFile* file : project.files) builder->scanned.push_back(&builder->GetScannedFile(*file));
+    StartBuild();
+    App().CollectFiles();
+    for (ProjectFile* file : App().files) builder->scanned.push_back(&builder->GetScannedFile(*file));
     CreateDirectories(builder->IntermediateDirectory(), true);
     trace.clear();
     return *builder;
   }
 
-  ConfigSettings settings;
-  Workspace workspace{settings};
-  std::unique_ptr<ProjectBuilder> builder;
-  std::string trace;
-
  private:
-  std::filesystem::path m_start, m_folder;
   std::string m_path;
 };
 
@@ -138,7 +85,7 @@ TEST_F(ToolsTest, RunCommandAnswersAsTheOptionsSay) {
 
 TEST_F(ToolsTest, CommandsThatFail) {
   AddTool("dies", "kill -ABRT $$\n");
-  AddFile("plain", "");
+  Write("plain", "");
   std::filesystem::create_directory("out2.txt");
   std::string text;
   const struct {
@@ -170,20 +117,15 @@ TEST_F(ToolsTest, InterruptedCommandsEndTheRun) {
   AddTool("stopped", "kill -INT $$\n");
   std::string output;
   int code;
-  try {
-    RunCommand("cmd /c stopped x", code, {.output = &output});
-    FAIL();
-  } catch (const LexScannerException& exception) {
-    ASSERT_EQ("Interrupted while running stopped", exception.message);
-  }
+  ASSERT_EQ("Interrupted while running stopped",
+            MessageOf([&] { RunCommand("cmd /c stopped x", code, {.output = &output}); }));
   ASSERT_FALSE(FileExists("out1.txt"));
 }
 
 // --- Compilers
 
 TEST_F(ToolsTest, CompilerCommandLines) {
-  Project& app = AddProject("app", TargetType::Application);
-  ProjectFile& source = AddSource(app, "x.cpp");
+  Project& app = AddApp("Application", "\"x.cpp\"");
   app.configs.front()->compilerText = " -g -DA=\"b c\"";
   app.configs.front()->compilerOptions = {{"Optimization", "2"}, {"PreprocessorDefinitions", "A;B"}};
   const std::string visualIncludes =
@@ -203,7 +145,7 @@ TEST_F(ToolsTest, CompilerCommandLines) {
                                                         {CompilerKind::vc14, visualText("")}};
   for (const auto& [compiler, expected] : cases) {
     Builder(compiler);
-    ASSERT_TRUE(CompileFile(*builder, builder->GetScannedFile(source)));
+    ASSERT_TRUE(CompileFile(*builder, Source("x.cpp")));
     ASSERT_EQ("", trace);
     ASSERT_EQ(expected, TakeLog());
     ASSERT_FALSE(FileExists("x64/Debug/app/compiler.rsp"));
@@ -211,7 +153,7 @@ TEST_F(ToolsTest, CompilerCommandLines) {
   app.usesQrex = false;
   settings.diagnostics = true;
   Builder(CompilerKind::clang);
-  CompileFile(*builder, builder->GetScannedFile(source));
+  CompileFile(*builder, Source("x.cpp"));
   ASSERT_EQ(
       "Compiling app/src/x.cpp\nx64/Debug/app/compiler.rsp =  -g -DA=\"b c\" -I\"tree/app\" -I\"tree/app/src\""
       " -I\"tree\" -o \"x64/Debug/app/x.o\" \"tree/app/src/x.cpp\"\n"
@@ -220,23 +162,21 @@ TEST_F(ToolsTest, CompilerCommandLines) {
 }
 
 TEST_F(ToolsTest, AssemblersAndResources) {
-  Project& app = AddProject("app", TargetType::Application);
-  ProjectFile& assembly = AddSource(app, "x.asm");
-  ProjectFile& resource = AddSource(app, "r.rc");
+  Project& app = AddApp("Application", "\"x.asm\" \"r.rc\"");
   app.configs.front()->resourceOptions = {{"PreprocessorDefinitions", "A"}, {"ShowProgress", "true"}};
   Builder(CompilerKind::vc9);
-  ASSERT_TRUE(AssembleFile(*builder, builder->GetScannedFile(assembly)));
+  ASSERT_TRUE(AssembleFile(*builder, Source("x.asm")));
   ASSERT_EQ(
       "ml /coff /c /Cx /nologo @x64/Debug/app/masm.rsp\n /Fo\"x64/Debug/app/\" "
       "\"qrexsource/x64/Debug/app/src/x.asm\"\n",
       TakeLog());
-  ASSERT_TRUE(CompileResource(*builder, builder->GetScannedFile(resource)));
+  ASSERT_TRUE(CompileResource(*builder, Source("r.rc")));
   ASSERT_EQ("rc.exe /d A /v /fox64/Debug/app/r.res tree/app/src/r.rc\n", TakeLog());
   ASSERT_EQ("Compiling resource file app/src/r.rc\n", trace);
-  AddFile("status", "4");
+  Write("status", "4");
   settings.diagnostics = true;
   trace.clear();
-  ASSERT_FALSE(CompileResource(*builder, builder->GetScannedFile(resource)));
+  ASSERT_FALSE(CompileResource(*builder, Source("r.rc")));
   ASSERT_EQ(
       "Compiling resource file app/src/r.rc\nrc.exe /d \"A\" /v  /fo\"x64/Debug/app/r.res\" \"tree/app/src/r.rc\"\n"
       "Return code : 4\n",
@@ -246,7 +186,7 @@ TEST_F(ToolsTest, AssemblersAndResources) {
   TakeLog();
   app.configs.front()->platform = "Win64";
   Builder(CompilerKind::vc9);
-  ASSERT_TRUE(AssembleFile(*builder, builder->GetScannedFile(assembly)));
+  ASSERT_TRUE(AssembleFile(*builder, Source("x.asm")));
   ASSERT_TRUE(TakeLog().starts_with("ml64 /c /Cx /nologo @Win64/Debug/app/masm.rsp\n"));
   ASSERT_TRUE(
       trace.starts_with("Assembling app/src/x.asm\nWin64/Debug/app/masm.rsp =  /Fo\"Win64/Debug/app/\" "
@@ -257,7 +197,7 @@ TEST_F(ToolsTest, AssemblersAndResources) {
 
 // What a compiler's output and return code make of a file, and of the object that it left.
 TEST_F(ToolsTest, ResultsOfACompiler) {
-  ProjectFile& source = AddSource(AddProject("app", TargetType::Application), "x.cpp");
+  AddApp("Application", "\"x.cpp\"");
   const auto kGcc = CompilerKind::gcc, kVisual = CompilerKind::vc14;
   const struct {
     CompilerKind compiler;
@@ -281,11 +221,11 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
   for (const auto& test : cases) {
     SCOPED_TRACE(std::string(test.output) + test.status);
     Builder(test.compiler);
-    AddFile("say", test.output);
-    AddFile("status", test.status);
-    const std::string object = ObjectPath(*builder, source);
-    AddFile(object, "object");
-    EXPECT_EQ(test.succeeds, CompileFile(*builder, builder->GetScannedFile(source)));
+    Write("say", test.output);
+    Write("status", test.status);
+    const std::string object = ObjectPath(*builder, Source("x.cpp").file);
+    Write(object, "object");
+    EXPECT_EQ(test.succeeds, CompileFile(*builder, Source("x.cpp")));
     EXPECT_EQ(test.errors, builder->errorCount);
     EXPECT_EQ(test.warnings, builder->warningCount);
     EXPECT_EQ(test.keepsObject, FileExists(object));
@@ -296,7 +236,7 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
 // --- Output
 
 TEST_F(ToolsTest, MessagesAreCounted) {
-  AddProject("app", TargetType::Application);
+  AddApp("Application", "");
   const auto kGcc = CompilerKind::gcc, kVisual = CompilerKind::vc9;
   const struct {
     CompilerKind compiler;
@@ -339,12 +279,10 @@ TEST_F(ToolsTest, MessagesAreCounted) {
 }
 
 TEST_F(ToolsTest, MessagesPointAtTheSource) {
-  Project& app = AddProject("app", TargetType::Application);
-  ProjectFile& source = AddSource(app, "x.cpp", "@def both = { int a;\nint b; }\nboth\nint c;\n");
-  ProjectFile& unused = AddSource(app, "unused.cpp");
+  AddApp("Application", "\"x.cpp\" \"unused.cpp\"");
+  Write("tree/app/src/x.cpp", "@def both = { int a;\nint b; }\nboth\nint c;\n");
   Builder(CompilerKind::gcc);
-  builder->GetScannedFile(unused);
-  ScannedFile& scanned = builder->GetScannedFile(source);
+  ScannedFile& scanned = Source("x.cpp");
   scanned.needsWriting = true;
   BringUpToDate(scanned);
   trace.clear();
@@ -385,9 +323,8 @@ TEST_F(ToolsTest, MessagesPointAtTheSource) {
 // --- Links
 
 TEST_F(ToolsTest, VisualLinks) {
-  Project& app = AddProject("app", TargetType::DynamicLinkLibrary, {"base"});
-  AddProject("base", TargetType::StaticLibrary).configs.front()->linkerText = "\"z.lib\"";
-  for (const char* name : {"a.cpp", "b.c", "c.asm", "r.rc", "h.h"}) AddSource(app, name);
+  WriteProject("base", "Static Library", "+link { \"z.lib\" } qrex { }");
+  Project& app = AddApp("Dynamic-Link Library", R"("a.cpp" "b.c" "c.asm" "r.rc" "h.h")", "subproj { \"base\" }");
   app.configs.front()->linkerText = " /DLL x.obj \"$(Platform).lib\" /OUT:\"o $(Platform)/$(Configuration).dll\" /ltcg";
   app.configs.front()->generalOptions["WholeProgramOptimization"] = "1";
   Builder(CompilerKind::vc14);
@@ -404,9 +341,7 @@ TEST_F(ToolsTest, VisualLinks) {
       "mt.exe @x64/Debug/app/mt.rsp /nologo\n/outputresource:\"lib/x64/Debug/app.dll\";#2 /manifest"
       " \"./x64/Debug/app/app.dll.intermediate.manifest\"\n\n",
       TakeLog());
-  std::string mark;
-  ASSERT_TRUE(LoadText(mark, "x64/Debug/app/mt.dep", true));
-  ASSERT_EQ("Manifest resource last updated at ", mark.substr(0, 34));
+  ASSERT_TRUE(ReadText("x64/Debug/app/mt.dep").starts_with("Manifest resource last updated at "));
   ASSERT_FALSE(FileExists("x64/Debug/app/mt.rsp") || FileExists("x64/Debug/app/mtdep.bat"));
 
   app.configs.front()->linkerText = "/LTCG:STATUS";
@@ -422,8 +357,8 @@ TEST_F(ToolsTest, VisualLinks) {
 }
 
 TEST_F(ToolsTest, FailedLinks) {
-  AddProject("app", TargetType::Application);
-  AddFile("status", "5");
+  AddApp("Application", "");
+  Write("status", "5");
   Builder(CompilerKind::vc14);
   ASSERT_FALSE(LinkTarget(*builder, TargetPath(*builder), {"a.obj"}));
   ASSERT_EQ(
@@ -440,14 +375,12 @@ TEST_F(ToolsTest, FailedLinks) {
 }
 
 TEST_F(ToolsTest, GccLinks) {
-  Project& app = AddProject("app", TargetType::Application, {"top", "shared", "base"});
-  AddProject("top", TargetType::StaticLibrary, {"base", "middle"});
-  AddProject("middle", TargetType::StaticLibrary, {"base"});
-  AddProject("base", TargetType::StaticLibrary);
-  AddProject("shared", TargetType::DynamicLinkLibrary, {"hidden"}).exported = true;
-  AddProject("hidden", TargetType::StaticLibrary);
-  AddSource(app, "a.cpp");
-  AddSource(app, "r.rc");
+  WriteProject("top", "Static Library", "subproj { \"base\" \"middle\" } { }");
+  WriteProject("middle", "Static Library", "subproj { \"base\" } { }");
+  WriteProject("base", "Static Library", "{ }");
+  WriteProject("shared", "Dynamic-Link Library", "export subproj { \"hidden\" } { }");
+  WriteProject("hidden", "Static Library", "{ }");
+  Project& app = AddApp("Application", "\"a.cpp\" \"r.rc\"", "subproj { \"top\" \"shared\" \"base\" }");
   app.configs.front()->linkerText = " -lm \"-Wl,-z now\"";
   std::string folder;
   FullPathOf("lib/x64/Debug", folder);
@@ -472,7 +405,7 @@ TEST_F(ToolsTest, GccLinks) {
 
   app.targetType = TargetType::StaticLibrary;
   Builder(CompilerKind::gcc);
-  AddFile("lib/x64/Debug/libapp.a", "old members");
+  Write("lib/x64/Debug/libapp.a", "old members");
   LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder));
   ASSERT_EQ("ar rcs lib/x64/Debug/libapp.a @x64/Debug/app/linker.rsp\n \"x64/Debug/app/a.o\"\n", TakeLog());
   ASSERT_FALSE(FileExists("lib/x64/Debug/libapp.a"));

@@ -2,7 +2,7 @@
 
 #include "driver/config_parser.h"
 #include "driver/run_workspace.h"
-#include "workspace/workspace_fixture.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
@@ -13,7 +13,7 @@ std::string Joined(const std::vector<std::string>& entries) {
   return text;
 }
 
-class ConfigTest : public WorkspaceTest {
+class ConfigTest : public WorldTest {
  protected:
   ConfigTest() { Reset(); }
 
@@ -155,6 +155,7 @@ TEST_F(ConfigTest, SearchOfImports) {
   Write("tree/y", "");
   Write("more/y", "");
   settings.context.importPaths = {"none", "p"};
+  settings.virtualTree = {"tree", "more"};
   std::string found, root;
   EXPECT_TRUE(FindImport(settings, "x", found));
   EXPECT_EQ("p/x", found);

@@ -9,10 +9,9 @@ import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Skipped, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import COMPILERS, Skipped, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
 
 ROOT = Path(__file__).resolve().parents[2]
-COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 SHAPES = """class geo::Box
     geo::Point[2] corners
 class geo::Canvas

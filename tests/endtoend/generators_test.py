@@ -7,10 +7,9 @@ import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, lacks, run_tests  # noqa: E402
+from workspace_fixture import COMPILERS, SETTINGS, Workspace, equal, holds, lacks, run_tests  # noqa: E402
 
 DATA = Path(__file__).parents[1] / "generators/workspace"
-COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 NAMESPACE = "{http://schemas.microsoft.com/developer/msbuild/2003}"
 
 

@@ -9,7 +9,7 @@ import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, need, run_tests  # noqa: E402
+from workspace_fixture import COMPILERS, SETTINGS, Workspace, equal, need, run_tests  # noqa: E402
 
 PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n%s\n{\n    "src"\n    {\n        %s\n    }\n}\n'
 FILES = {
@@ -97,7 +97,7 @@ def an_import_that_is_not_found(binary):
 
 def an_invalid_word(binary):
     equal(hints_of(binary, {"main.qrex": "mode = biuld"}), ["one of clean compile build gen show"])
-    equal(hints_of(binary, {"main.qrex": "compiler = g++"}), ["one of vc6 vc8 vc9 vc10 vc11 vc12 vc14 gcc winegcc clang"])
+    equal(hints_of(binary, {"main.qrex": "compiler = g++"}), ["one of " + " ".join(COMPILERS)])
     equal(hints_of(binary, {"main.qrex": "moed = build"}), ["no statement begins so; Qrex --help lists the keys"])
     equal(hints_of(binary, {"tree/tool/src/tool.qrpj": PROJECT % ("Utility Project", "tool", "", '"tool.cpp" : exlude')}),
           ["an option of a file is one of exclude, +cpp, -cpp"])

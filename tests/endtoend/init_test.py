@@ -10,10 +10,9 @@ import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from workspace_fixture import COMPILERS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
 
 ROOT = Path(__file__).resolve().parents[2]
-COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 
 
 def contents(folder):

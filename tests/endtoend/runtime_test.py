@@ -52,12 +52,12 @@ def read_as_visual_cpp(workspace, project):
         assert not ours, "\n".join(ours[:20])
 
 
-def translate(binary, workspace_file, keys=""):
+def translate(binary, workspace_file, keys="", tree=HERE / "runtime" / "tree"):
     """A workspace with a copy of the tree, translated; the folder of what comes of it."""
     settings = SETTINGS + (f'virtualTree += {{ "{ROOT / "runtime"}" }} workspaces = {{ "{workspace_file}" }} '
                            f'translateOnly = true {keys}')
     workspace = Workspace(binary, {"all.qrex": settings})
-    shutil.copytree(HERE / "runtime" / "tree", workspace.path("tree"))
+    shutil.copytree(tree, workspace.path("tree"))
     workspace.run("all.qrex")
     write_library(workspace)
     return workspace, "qrexsource/x64/Debug"
@@ -163,6 +163,25 @@ def test_tour(binary):
         compile_with_clang(workspace, ["orders1", "orders", "app"], "-Wno-deprecated-declarations")
 
 
+def test_libcxx(binary):
+    """Another standard library: the tour runs, and each kind of type is registered."""
+    need("clang++")
+    compiler = "clang++ -stdlib=libc++ -std=c++17 -Wall -Werror -Wno-logical-op-parentheses -Wno-deprecated-declarations"
+    if subprocess.run([*compiler.split(), "-xc++", "-include", "set", "/dev/null", "-o", "/dev/null", "-shared"],
+                      capture_output=True).returncode != 0:
+        raise Skipped("libc++")
+    workspace, root = translate(binary, "tour.qrws", tree=TOUR / "tree")
+    with workspace:
+        for project in ("orders1", "orders", "app"):
+            workspace.shell(f"{compiler} -c -I{root} -I{root}/{project} -I{root}/{project}/src {root}/{project}/src/*.cpp")
+        workspace.shell(f"{compiler} -I{root} *.o library.cpp -o tour")
+        equal(workspace.shell("./tour"), (TOUR / "expected.txt").read_text())
+    workspace, root = translate(binary, "all.qrws")
+    with workspace:
+        for source in ("kinds/src/kinds.cpp", "check/src/bare.cpp"):
+            workspace.shell(f"{compiler} -Dshapes_API= -I{root} -fsyntax-only {root}/{source}")
+
+
 def test_byte_order(binary):
     """Scalars are little-endian in archives; the forced switch turns them around, both ways."""
     need("g++")
@@ -238,4 +257,5 @@ def test_modules(binary):
 
 
 if __name__ == "__main__":
-    run_tests([test_every_kind, test_compilable_text, test_tour, test_byte_order, test_ipc, test_threads, test_sockets, test_modules])
+    run_tests([test_every_kind, test_compilable_text, test_tour, test_libcxx, test_byte_order, test_ipc, test_threads, test_sockets,
+               test_modules])

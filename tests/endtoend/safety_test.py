@@ -98,9 +98,12 @@ def a_folder_that_cannot_be_listed_is_told(binary):
             library = str(workspace.path("inject.so"))
             subprocess.run(["cc", "-shared", "-fPIC", "-o", library, folder / "inject.c", "-ldl"], check=True)
         for call in ("opendir", "readdir"):
+            # A sanitizer wants to be the first library of the process.
+            sanitizer = os.environ.get("ASAN_OPTIONS", "") + ":verify_asan_link_order=0"
             done = subprocess.run([binary, "all.qrex", "translateOnly=true"], cwd=workspace.folder, stdout=subprocess.PIPE,
                                   text=True, env={**os.environ, "LD_PRELOAD": library, "FAULT_CALL": call, "FAULT_AT": "1",
-                                                  "FAULT_HOW": "fail", "FAULT_ERRNO": "13"})
+                                                  "FAULT_HOW": "fail", "FAULT_ERRNO": "13", "FAULT_STICKS": "1",
+                                                  "ASAN_OPTIONS": sanitizer})
             equal(done.returncode, 1)
             holds(done.stdout, "app.qrpj(5) : Couldn't list folder tree/app/src : Access is denied.\n")
 

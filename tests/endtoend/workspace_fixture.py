@@ -25,6 +25,9 @@ INCLUDE("x64") = { "/usr/include" }
 LIB("x64") = { "/usr/lib" }
 """
 
+# The words of `compiler`, in their order.
+COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
+
 
 class Skipped(Exception):
     """A test needs a tool that is not installed; the text names it."""

@@ -9,8 +9,8 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   fuzz::Run([&] {
     static fuzz::World world(CompilerKind::gcc, "{ \"t.h\" \"src\" { \"app.cpp\" } }\n");
     static const bool isChecked = world.workspace->CheckFileReferences();
-    ProjectBuilder builder(world.settings, world.App(), *world.App().configs.front());
-    if (isChecked && ParseDependencyPayload(builder, bytes)) DependencyPayload(builder);
+    world.StartBuild();
+    if (isChecked && ParseDependencyPayload(*world.builder, bytes)) DependencyPayload(*world.builder);
     ReplaceFile("projects.guids", bytes);
     world.workspace->SyncProjectGuids();
   });

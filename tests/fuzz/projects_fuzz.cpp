@@ -1,4 +1,5 @@
 // Configuration, workspace and project files. The first byte says which.
+#include "driver/config_parser.h"
 #include "fuzz/fuzz_world.h"
 #include "workspace/workspace_parser.h"
 
@@ -14,12 +15,13 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
       case 0: {
         ConfigSettings settings;
         settings.macroWorld.limits = fuzz::kLimits;
+        fuzz::World::Write("empty.qrex", "");
         if (LoadConfiguration(settings, "empty.qrex", text)) ValidateSettings(settings);
         break;
       }
       case 1: {
         fuzz::World world(CompilerKind::vc14, "{ }");
-        ReplaceFile("tree/all.qrws", text);
+        fuzz::World::Write("tree/all.qrws", text);
         WorkspaceParser parser(*world.workspace, "tree/all.qrws");
         MpfwSourceFile* file = parser.LoadSourceFile("tree/all.qrws");
         if (!file) break;

@@ -10,14 +10,14 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   static fuzz::World world(CompilerKind::gcc, "{ \"t.h\" \"src\" { \"app.cpp\" } }\n");
   world.settings.compiler = data[0] % 2 ? CompilerKind::gcc : CompilerKind::vc14;
   static const bool isChecked = world.workspace->CheckFileReferences();
-  static ProjectBuilder builder(world.settings, world.App(), *world.App().configs.front());
+  if (!world.builder) world.StartBuild();
   fuzz::Run([&] {
-    if (isChecked && !builder.FindFile("app/t.h")) __builtin_trap();
-    ScannedFile& header = builder.GetScannedFile(*builder.FindFile("app/t.h"));
+    if (isChecked && !world.builder->FindFile("app/t.h")) __builtin_trap();
+    ScannedFile& header = world.Scanned("app/t.h");
     header.translated = true;
     header.sourceText = "a\nb\n";
     header.lineTable = {nullptr, header.sourceText.data()};
-    ScanToolOutput(builder, output);
+    ScanToolOutput(*world.builder, output);
   });
   return 0;
 }

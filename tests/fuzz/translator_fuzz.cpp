@@ -9,12 +9,12 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   if (text.find("python") != std::string::npos) return 0;
   fuzz::Run([&] {
     fuzz::World world(CompilerKind::gcc, "{ \"t.h\" \"src\" { \"app.cpp\" } }\n");
-    ReplaceFile("tree/app/t.h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);
-    ReplaceFile("tree/app/src/app.cpp", "@import \"app/t.h\"\n");
+    fuzz::World::Write("tree/app/t.h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);
+    fuzz::World::Write("tree/app/src/app.cpp", "@import \"app/t.h\"\n");
     world.workspace->CheckFileReferences();
     world.App().CollectFiles();
-    ProjectBuilder builder(world.settings, world.App(), *world.App().configs.front());
-    BringUpToDate(builder.GetScannedFile(*builder.FindFile("app/src/app.cpp")));
+    world.StartBuild();
+    BringUpToDate(world.Scanned("app/src/app.cpp"));
   });
   return 0;
 }

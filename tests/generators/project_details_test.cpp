@@ -8,20 +8,16 @@ namespace {
 
 class ProjectDetailsTest : public GenerateTest {
  protected:
-  void LoadAndGenerate(CompilerKind compiler, const std::string& project = "app/src/app.qrpj") {
+  void LoadAndGenerate(CompilerKind compiler, const std::string& entry = "app") {
     settings.compiler = compiler;
-    Load(project);
-    trace.clear();
-    Generate();
+    Generate(entry);
   }
   static void AssertHolds(const std::string& path, const std::string& text) {
-    std::string content;
-    ASSERT_TRUE(LoadText(content, path, true)) << path;
+    const std::string content = ReadText(path);
     EXPECT_NE(content.find(text), std::string::npos) << path << " lacks:\n" << text << "\nIt is:\n" << content;
   }
   static void AssertLacks(const std::string& path, const std::string& text) {
-    std::string content;
-    ASSERT_TRUE(LoadText(content, path, true)) << path;
+    const std::string content = ReadText(path);
     EXPECT_EQ(content.find(text), std::string::npos) << path << " holds:\n" << text << "\nIt is:\n" << content;
   }
 };
@@ -30,8 +26,8 @@ class ProjectDetailsTest : public GenerateTest {
 TEST_F(ProjectDetailsTest, MissingDependency) {
   const std::string missing = "Error : Can't find dependent project old under project app\n";
   const std::string noLibrary = "Error : Can't find subproject old/src/old.qrpj under project app\n";
-  AddProject("app", "Application", "subproj { \"old\" } { }");
-  AddFile("tree/old/src/old.qrpj", "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"new\" { }");
+  WriteProject("app", "Application", "subproj { \"old\" } { }");
+  Write("tree/old/src/old.qrpj", "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"new\" { }");
 
   LoadAndGenerate(CompilerKind::vc6);
   EXPECT_EQ(trace, "Writing app.dsp\nWriting new.dsp\n" + missing + "Writing all.dsw\n");
@@ -51,16 +47,16 @@ TEST_F(ProjectDetailsTest, MissingDependency) {
   EXPECT_TRUE(trace.ends_with("Writing all.make\n" + missing + "Writing all.workspace\nWriting all.geany\n")) << trace;
   AssertHolds("app.cbp", "\t\t\t\t\t<Add option=\"-lold\" />\n");
 
-  AddProject("app", "Application", "subproj { \"old\" } qrex { }");  // a second pass, over the same names
+  WriteProject("app", "Application", "subproj { \"old\" } qrex { }");  // a second pass, over the same names
   LoadAndGenerate(CompilerKind::gcc);
   EXPECT_TRUE(trace.ends_with("Skipping all.make\n" + missing + "Skipping all.workspace\nSkipping all.geany\n"))
       << trace;
 }
 
 TEST_F(ProjectDetailsTest, PrepackagedProjectsInSolutions) {
-  AddProject("app", "Application", "subproj { \"pre\" } { }");
-  AddFile("tree/pre/src/pre.qrpj",
-          "$TARGET_TYPE = \"Library\" $ROOT_TO_PROJDIR = \"pre\" export config { \"Debug|x64\" \"Odd|x64\" } { }");
+  WriteProject("app", "Application", "subproj { \"pre\" } { }");
+  Write("tree/pre/src/pre.qrpj",
+        "$TARGET_TYPE = \"Library\" $ROOT_TO_PROJDIR = \"pre\" export config { \"Debug|x64\" \"Odd|x64\" } { }");
   settings.solutionContainsPrepackagedProjects = false;
   LoadAndGenerate(CompilerKind::vc9);
   const std::string app = "{22222222-2222-2222-2222-222222222222}";
@@ -95,7 +91,7 @@ TEST_F(ProjectDetailsTest, PrepackagedProjectsInSolutions) {
 }
 
 TEST_F(ProjectDetailsTest, OptionsOfTheNewFormat) {
-  AddProject("app", "Console Application", R"qrpj(qrex
+  WriteProject("app", "Console Application", R"qrpj(qrex
     general { CharacterSet = "3" UseOfATL = "2" UseOfMFC = "-1" ManagedExtensions = "x" WholeProgramOptimization = "4" }
     +cpp ("Debug") { /Fp "a.pch" /FI "b.h" /FI "c.h" /C /arch:AVX /Fr /fp:except - /clr:pure /wd 4100 /Fe "e" }
     +rc ("Debug") { /fo "a.res" /x }
@@ -139,7 +135,7 @@ TEST_F(ProjectDetailsTest, OptionsOfTheNewFormat) {
 
 // A utility project has no tool of any sort.
 TEST_F(ProjectDetailsTest, UtilityProjects) {
-  AddProject("app", "Utility Project", "+link { /NOLOGO } { }");
+  WriteProject("app", "Utility Project", "+link { /NOLOGO } { }");
   LoadAndGenerate(CompilerKind::vc6);
   AssertHolds("app.dsp", "# ADD BSC32 /nologo\n\n!ELSEIF");
   LoadAndGenerate(CompilerKind::vc8);
@@ -149,8 +145,8 @@ TEST_F(ProjectDetailsTest, UtilityProjects) {
 }
 
 TEST_F(ProjectDetailsTest, LibrarianOfTheNewFormat) {
-  AddProject("lib", "Static Library", "+link (\"Debug\") { /NOLOGO /EXPORT:\"f\" } { }");
-  LoadAndGenerate(CompilerKind::vc14, "lib/src/lib.qrpj");
+  WriteProject("lib", "Static Library", "+link (\"Debug\") { /NOLOGO /EXPORT:\"f\" } { }");
+  LoadAndGenerate(CompilerKind::vc14, "lib");
   EXPECT_EQ(trace,
             "todo : librarian switch ExportNamedFunctions = f\nWriting lib.vcxproj\nWriting lib.vcxproj.filters\n"
             "Writing all.sln\n");
@@ -158,8 +154,8 @@ TEST_F(ProjectDetailsTest, LibrarianOfTheNewFormat) {
 }
 
 TEST_F(ProjectDetailsTest, IncludesOfAllRoots) {
-  AddProject("app", "Application",
-             R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj");
+  WriteProject("app", "Application",
+               R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj");
   settings.virtualTree = {"tree", "other"};
   LoadAndGenerate(CompilerKind::vc8);
   AssertHolds("app.vcproj", "AdditionalIncludeDirectories=\"tree/app;tree/app/src;a;tree;other;tree/b;other/b\"\n");
@@ -169,7 +165,7 @@ TEST_F(ProjectDetailsTest, IncludesOfAllRoots) {
 }
 
 TEST_F(ProjectDetailsTest, DebugByNameInVc6) {
-  AddProject("app", "Console Application", "config { \"Win64 Debug|x64\" } { }");
+  WriteProject("app", "Console Application", "config { \"Win64 Debug|x64\" } { }");
   LoadAndGenerate(CompilerKind::vc6);
   AssertHolds("app.dsp", "# TARGTYPE \"Win32 (x86) Console Application\" 0x0103\n");
   AssertHolds("app.dsp",
@@ -181,13 +177,13 @@ TEST_F(ProjectDetailsTest, GccWorkspaces) {
   settings.compiler = CompilerKind::gcc;
   Workspace empty(settings);
   empty.name = "all";
-  Generator().WriteWorkspace(empty, Form::Plain);
+  Generator(settings.leftovers).WriteWorkspace(empty, Form::Plain);
   EXPECT_EQ(trace, "");
   EXPECT_TRUE(std::filesystem::is_empty("."));
 
   // No program: no project is active. The first project has headers only.
-  AddProject("base", "Library", "{ \"base.h\" }");
-  AddProject("app", "Dynamic-Link Library", "subproj { \"base\" } { \"app.cpp\" }");
+  WriteProject("base", "Library", "{ \"base.h\" }");
+  WriteProject("app", "Dynamic-Link Library", "subproj { \"base\" } { \"app.cpp\" }");
   LoadAndGenerate(CompilerKind::gcc);
   AssertHolds("all.workspace",
               "\t\t<Project filename=\"base.cbp\">\n\t\t</Project>\n"
@@ -195,7 +191,7 @@ TEST_F(ProjectDetailsTest, GccWorkspaces) {
   AssertHolds("all.geany", "[files]\ncurrent_page=0\n\n[build-menu]\n");
 
   // Without a configuration nothing is translated. A root may be the current folder.
-  AddFile("bare/src/bare.qrpj", "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"bare\" qrex { \"bare.c\" }");
+  Write("bare/src/bare.qrpj", "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"bare\" qrex { \"bare.c\" }");
   settings.virtualTree = {"tree", "."};
   LoadAndGenerate(CompilerKind::gcc, "bare/src/bare.qrpj");
   AssertHolds("bare.cbp",
@@ -203,8 +199,8 @@ TEST_F(ProjectDetailsTest, GccWorkspaces) {
               "\t\t\t<Add option=\"-Ibare/src\" />\n\t\t\t<Add option=\"-Itree\" />\n\t\t\t<Add option=\"-I.\" />\n"
               "\t\t</Compiler>\n\t\t<Unit filename=\"./bare/bare.c\" />\n");
 
-  AddProject("tool", "Console Application", "subproj { \"app\" } { }");
-  LoadAndGenerate(CompilerKind::clang, "tool/src/tool.qrpj");
+  WriteProject("tool", "Console Application", "subproj { \"app\" } { }");
+  LoadAndGenerate(CompilerKind::clang, "tool");
   AssertHolds("all.workspace", "\t\t<Project filename=\"tool.cbp\" active=\"1\">\n");
   AssertHolds("tool.cbp",
               "\t\t\t\t<Option object_output=\"x64/Debug/tool/\" />\n\t\t\t\t<Option type=\"1\" />\n"

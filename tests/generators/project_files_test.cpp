@@ -42,14 +42,9 @@ class ProjectFilesTest : public GenerateTest {
   // A translated form beside the plain one, any other file beside that of the application.
   static std::string Differences(const std::string& name) {
     const bool translated = name.starts_with("build_");
-    const std::string text = FoldedTextOf(name);
-    const std::string base = FoldedTextOf(translated ? name.substr(6) : "app" + name.substr(name.find('.')));
+    const std::string text = ReadText(name);
+    const std::string base = ReadText(translated ? name.substr(6) : "app" + name.substr(name.find('.')));
     return name + "\n" + (translated ? LinesBeyond(base, text, '-') : "") + LinesBeyond(text, base, '+');
-  }
-  static std::string FoldedTextOf(const std::string& path) {
-    std::string text;
-    EXPECT_TRUE(LoadText(text, path, true)) << path;
-    return text;
   }
 
   void AssertFormat(const Format& format) {
@@ -60,12 +55,11 @@ class ProjectFilesTest : public GenerateTest {
     settings.virtualTree = {"tree", family};
     settings.compiler = format.compiler;
     settings.targetXP = format.targetXP;
-    Load("app/src/app.qrpj");
-    Generate();
+    Generate("app");
 
     std::map<std::string, std::string> expected, generated;
     for (const auto& entry : std::filesystem::directory_iterator(folder)) {
-      std::string& text = expected[entry.path().filename()] = FoldedTextOf(entry.path());
+      std::string& text = expected[entry.path().filename()] = ReadText(entry.path());
       for (const auto& [from, to] : format.differences) ReplaceAllInPlace(text, from, to);
       if (entry.path().filename() != "others.txt") text = WithCarriageReturns(text);
     }
@@ -76,7 +70,7 @@ class ProjectFilesTest : public GenerateTest {
     }
     for (const std::string& name : names) {
       if (expected.count(name)) {
-        generated[name] = TextOf(name);
+        generated[name] = Read(name);
       } else {
         generated["others.txt"] += Differences(name);
       }

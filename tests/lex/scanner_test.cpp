@@ -12,8 +12,8 @@ namespace qrex {
 
 // The message and the offset of a failure; else what `read` answers.
 template <typename Read>
-std::string Outcome(const std::string& text, Read read) {
-  LexScanner scanner{std::string_view(text)};
+std::string Outcome(const std::string& text, Read read, Dialect dialect = Dialect::Qrex) {
+  LexScanner scanner(std::string_view(text), dialect);
   try {
     return read(scanner);
   } catch (const LexScannerException& exception) {
@@ -22,15 +22,15 @@ std::string Outcome(const std::string& text, Read read) {
 }
 
 // Each token as kind (10000 left out) and text; a failure ends the list.
-std::string Tokens(const std::string& text, bool keepComments = false) {
+std::string Tokens(const std::string& text, bool keepComments = false, Dialect dialect = Dialect::Qrex) {
   std::string tokens;
-  const std::string end = Outcome(text, [&](LexScanner& scanner) {
-    for (;;) {
-      const LexToken token = NextToken(scanner, keepComments);
-      if (token.kind == kEndOfText) return std::string();
+  const auto list = [&](LexScanner& scanner) {
+    for (LexToken token; (token = NextToken(scanner, keepComments)).kind != kEndOfText;) {
       tokens += (tokens.empty() ? "" : "  ") + std::to_string(token.kind - 10000) + " " + token.text.Text();
     }
-  });
+    return std::string();
+  };
+  const std::string end = Outcome(text, list, dialect);
   return end.empty() ? tokens : tokens + "  !" + end;
 }
 
@@ -240,18 +240,7 @@ TEST(SectionsTest, Blocks) {
 }
 
 // C++ text: what a compiler takes is a token, and nothing that it would skip fails.
-std::string CppTokens(const std::string& text) {
-  std::string tokens;
-  LexScanner scanner(std::string_view(text), Dialect::Cpp);
-  try {
-    for (LexToken token; (token = NextToken(scanner)).kind != kEndOfText;) {
-      tokens += (tokens.empty() ? "" : "  ") + std::to_string(token.kind - 10000) + " " + token.text.Text();
-    }
-    return tokens;
-  } catch (const LexScannerException& exception) {
-    return tokens + "  !" + exception.message + " at " + std::to_string(exception.position - text.data());
-  }
-}
+std::string CppTokens(const std::string& text) { return Tokens(text, false, Dialect::Cpp); }
 
 TEST(CppScannerTest, Numbers) {
   EXPECT_EQ("5 1.  5 .5f  5 0x1p-3  3 0b1  3 1'000'000  3 10_km  4 0xE+1",

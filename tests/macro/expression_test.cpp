@@ -2,19 +2,18 @@
 
 #include "expand_fixture.h"
 #include "macro/expression_parser.h"
+#include "message_of.h"
 
 namespace qrex {
 
 // The value as text by explicit conversion, or the error's message.
 std::string Evaluate(const std::string& text) {
-  ExpressionParser parser;
-  try {
+  return MessageOf([&] {
+    ExpressionParser parser;
     parser.SetInput(TextRange(std::string_view(text)));
-    std::string value = parser.ReadStringValue(true);
+    const std::string value = parser.ReadStringValue(true);
     return parser.current.kind == kEndOfText ? value : value + " then " + Printed(parser.current);
-  } catch (const LexScannerException& exception) {
-    return exception.message;
-  }
+  });
 }
 
 struct Evaluation {
@@ -139,11 +138,7 @@ TEST(ExpressionTest, TypedReaders) {
   const auto read = [](const std::string& text, auto reader) {
     ExpressionParser parser;
     parser.SetInput(TextRange(std::string_view(text)));
-    try {
-      return std::to_string(reader(parser));
-    } catch (const LexScannerException& exception) {
-      return exception.message;
-    }
+    return MessageOf([&] { return std::to_string(reader(parser)); });
   };
   EXPECT_EQ("-128", read("-128", [](auto& parser) { return parser.ReadInt8(); }));
   EXPECT_EQ("No implicit conversion from value 128 to int8", read("128", [](auto& p) { return p.ReadInt8(); }));

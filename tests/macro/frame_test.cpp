@@ -1,6 +1,7 @@
 // Names, imports and substitutions of frames; the map from the output back to the source.
 
 #include "expand_fixture.h"
+#include "message_of.h"
 
 namespace qrex {
 
@@ -10,12 +11,10 @@ class FrameTest : public ::testing::Test {
     frame.AddVariable(std::make_unique<LSVar>(name, value));
   }
   static std::string Find(const LSFrame& frame, const char* name) {
-    try {
+    return MessageOf([&] {
       const LSVariable* found = frame.Find(name, nullptr);
       return found ? found->ValueText() : "none";
-    } catch (const LexScannerException& exception) {
-      return exception.message;
-    }
+    });
   }
 
   MacroWorld world;

@@ -3,6 +3,7 @@
 #include <utility>
 
 #include "expand_fixture.h"
+#include "message_of.h"
 #include "platform/system.h"
 #include "text/numbers.h"
 
@@ -79,12 +80,8 @@ TEST_F(MessagesTest, Definitions) {
   });
   LSFrame frame(world);
   const std::string text = "@def+ m = 1";
-  try {
-    ExpandToString(nullptr, frame, TextRange(std::string_view(text)));
-    FAIL();
-  } catch (const LexScannerException& exception) {
-    EXPECT_EQ("No filescope frame", exception.message);
-  }
+  EXPECT_EQ("No filescope frame",
+            MessageOf([&] { return ExpandToString(nullptr, frame, TextRange(std::string_view(text))); }));
 }
 
 TEST_F(MessagesTest, Calls) {

@@ -2,66 +2,46 @@
 
 #include "macro/mpfw_parser.h"
 
-#include <gtest/gtest.h>
-
-#include <filesystem>
-
-#include "text/files.h"
-#include "text/trace.h"
+#include "message_of.h"
+#include "world_fixture.h"
 
 namespace qrex {
 
-class MpfwParserTest : public ::testing::Test, public TraceHook {
+class MpfwParserTest : public WorldTest {
  protected:
   struct Parser : MpfwParser {
-    Parser(MpfwContext& context, std::string root) : MpfwParser(context), root(std::move(root)) {}
+    using MpfwParser::MpfwParser;
     bool ResolveImport(const std::string& path, std::string& found) override {
-      found = root + "/" + path;
-      return path == "missing" || FileExists(found);
+      found = path;
+      return FileExists(path);
     }
     void OnImportedFile(MpfwSourceFile& file) override {
-      imported += file.path.substr(root.size() + 1) + (file.expansion.empty() ? "" : " " + file.expansion) + ";";
+      imported += file.path + (file.expansion.empty() ? "" : " " + file.expansion) + ";";
     }
-    std::string root, imported;
+    std::string imported;
   };
 
-  MpfwParserTest() : root(::testing::TempDir() + "/qrex_mpfw") {
-    SetTraceHook(this);
-    CreateDirectories(root, true);
-  }
-  ~MpfwParserTest() override {
-    SetTraceHook(nullptr);
-    std::filesystem::remove_all(root);
-  }
-  void OnTrace(std::string_view text) override { trace.append(text); }
-
-  void AddFile(const std::string& name, const std::string& text) { ReplaceFile(root + "/" + name, text); }
   std::string Load(const std::string& name, const std::string& extraText = {}) {
-    const MpfwSourceFile* file = parser.LoadSourceFile(root + "/" + name, extraText);
+    const MpfwSourceFile* file = parser.LoadSourceFile(name, extraText);
     return file ? file->expansion : "none";
   }
   // What `act` answers with the text as input, or the error's message.
   template <typename Act>
   std::string With(const std::string& text, Act act) {
-    try {
+    return MessageOf([&] {
       parser.SetInput(TextRange(std::string_view(text)));
       return act();
-    } catch (const LexScannerException& exception) {
-      return exception.message;
-    }
+    });
   }
 
-  const std::string root;
-  std::string trace;
-  SourceFileList sources;
-  MacroWorld world;
-  MpfwContext context{sources, world};
-  Parser parser{context, root};
+  SourceFileList& sources = settings.sourceFiles;
+  MpfwContext& context = settings.context;
+  Parser parser{context};
 };
 
 TEST_F(MpfwParserTest, LoadsAndImports) {
-  AddFile("a", "@import \"b\"\r\n@importpath \"$(p)\\\\q/\"\r@$p = \"1\"@importpath (\"$\" + \"(p)\")\nf");
-  AddFile("b", "@def f = imported\n@$p = \"0\"\n");
+  Write("a", "@import \"b\"\r\n@importpath \"$(p)\\\\q/\"\r@$p = \"1\"@importpath (\"$\" + \"(p)\")\nf");
+  Write("b", "@def f = imported\n@$p = \"0\"\n");
   EXPECT_EQ("@import \"b\"\n\n\nimported\n g", Load("a", " g"));
   EXPECT_EQ((std::vector<std::string>{"0/q", "1"}), context.importPaths);
   EXPECT_EQ(2u, sources.size());
@@ -69,20 +49,19 @@ TEST_F(MpfwParserTest, LoadsAndImports) {
 }
 
 TEST_F(MpfwParserTest, ReportsErrors) {
-  AddFile("a", "x\n@import \"b\"\n");
-  AddFile("b", "\n\n@fail(\"no\")");
+  Write("a", "x\n@import \"b\"\n");
+  Write("b", "\n\n@fail(\"no\")");
   EXPECT_EQ("none", Load("a"));
-  EXPECT_EQ("\n" + root + "/b(3) : no\n\n" + root + "/a(2) : Can't import file: b\n", trace);
+  EXPECT_EQ("\nb(3) : no\n\na(2) : Can't import file: b\n", trace);
   trace.clear();
-  AddFile("a", "\n@import \"c$(v)\"");
+  Write("a", "\n@import \"c$(v)\"");
   EXPECT_EQ("none", Load("a"));
-  EXPECT_EQ("\n" + root + "/a(2) : Couldn't open file c$(v)\n", trace);
-  EXPECT_EQ("Couldn't open file " + root + "/none", With("", [&] { return Load("none"); }));
+  EXPECT_EQ("\na(2) : Couldn't open file c$(v)\n", trace);
+  EXPECT_EQ("Couldn't open file none", With("", [&] { return Load("none"); }));
   trace.clear();
-  AddFile("self", "@import \"self\"");
+  Write("self", "@import \"self\"");
   EXPECT_EQ("none", Load("self"));
-  EXPECT_EQ(0u,
-            trace.find("\n" + root + "/self(1) : Imports nested too deeply\n\n" + root + "/self(1) : Can't import"));
+  EXPECT_EQ(0u, trace.find("\nself(1) : Imports nested too deeply\n\nself(1) : Can't import"));
 }
 
 TEST_F(MpfwParserTest, ReadsStrings) {
@@ -130,7 +109,7 @@ TEST_F(MpfwParserTest, Statements) {
       return std::string(parsed ? "yes|" : "no|") + Printed(parser.current);
     });
   };
-  AddFile("a", "");
+  Write("a", "");
   EXPECT_EQ("no|x", import("x"));
   EXPECT_EQ("yes|x", import("@import \"a\" x"));
   EXPECT_EQ("", parser.imported);  // it was never loaded
@@ -142,7 +121,7 @@ TEST_F(MpfwParserTest, Statements) {
   EXPECT_EQ("Couldn't open file none", import("@import \"none\""));
 
   // In a loaded file, the one behind it goes ahead of one that was loaded earlier.
-  AddFile("b", "@quote(@import \"A\")");
+  Write("b", "@quote(@import \"A\")");
   Load("b");
   const MpfwSourceFile& importer = *sources.back();
   const auto importedBy = [&] {
@@ -150,9 +129,9 @@ TEST_F(MpfwParserTest, Statements) {
     parser.SetInput(TextRange(std::string_view(importer.expansion)));
     return parser.ParseImportStatement() ? parser.imported : "no";
   };
-  AddFile("A", "");
+  Write("A", "");
   EXPECT_EQ("a;", importedBy());
-  AddFile("a", "again");
+  Write("a", "again");
   Load("a");
   EXPECT_EQ("a again;", importedBy());
 

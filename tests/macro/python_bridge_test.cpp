@@ -5,7 +5,7 @@
 #include <gtest/gtest.h>
 
 #include "macro/expand.h"
-#include "text/trace.h"
+#include "message_of.h"
 
 namespace qrex {
 namespace {
@@ -17,26 +17,18 @@ class PythonTest : public ::testing::Test {
     if (answer.find("can't be loaded") != std::string::npos) GTEST_SKIP() << answer;
   }
 
-  template <typename Action>
-  static std::string TextOrError(Action action) {
-    try {
-      return action();
-    } catch (const LexScannerException& exception) {
-      return exception.message;
-    }
-  }
   static std::string Eval(const std::string& expression) {
-    return TextOrError([&] { return EvalPython(expression, nullptr); });
+    return MessageOf([&] { return EvalPython(expression, nullptr); });
   }
   static std::string Run(const std::string& code) {
-    return TextOrError([&] {
+    return MessageOf([&] {
       RunPython("commands block", code, nullptr);
       return std::string();
     });
   }
   // Each call is a file of its own.
   std::string Expand(std::string_view text) {
-    return TextOrError([&] {
+    return MessageOf([&] {
       MacroWorld world;
       LSFileFrame frame(world);
       return ExpandToString(nullptr, frame, TextRange(text));

@@ -2,18 +2,18 @@
 
 #include "platform/system.h"
 
-#include <gtest/gtest.h>
-
 #include <cstdlib>
-#include <filesystem>
 
 #include "platform/console.h"
 #include "platform/error.h"
 #include "platform/file_system.h"
+#include "world_fixture.h"
 
 namespace qrex::platform {
 
-TEST(SystemTest, Commands) {
+using SystemTest = WorldTest;
+
+TEST_F(SystemTest, Commands) {
   EXPECT_EQ(3, RunCommand("cmd /c exit 3"));
   EXPECT_EQ(0, RunCommand("true"));
   EXPECT_EQ(127, RunCommand("cmd /c command-that-is-nowhere 2>/dev/null"));
@@ -21,44 +21,35 @@ TEST(SystemTest, Commands) {
   EXPECT_EQ(0, RunCommand("printenv QREX_TEST 1>/dev/null"));
   // In quotes and outside of them what the shell would act on is text.
   for (const std::string text : {"$QREX_TEST", "`exit`", "a;exit", "a&b|c", "it's", "*", "a\\b"}) {
-    const std::string made = ::testing::TempDir() + "/" + text;
-    EXPECT_EQ(0, RunCommand("touch \"" + made + "\"")) << text;
-    EXPECT_TRUE(std::filesystem::remove(made)) << text;
-    EXPECT_EQ(0, RunCommand("touch " + made)) << text;
-    EXPECT_TRUE(std::filesystem::remove(made)) << text;
+    EXPECT_EQ(0, RunCommand("touch \"" + text + "\"")) << text;
+    EXPECT_TRUE(std::filesystem::remove(text)) << text;
+    EXPECT_EQ(0, RunCommand("touch " + text)) << text;
+    EXPECT_TRUE(std::filesystem::remove(text)) << text;
   }
 }
 
-TEST(SystemTest, CompilerOfTheGccFamily) {
-  const std::string directory = ::testing::TempDir() + "/qrex_path";
-  std::filesystem::create_directories(directory);
-  ASSERT_TRUE(WriteFile(directory + "/gcc", "#!/bin/sh\nexit 7\n"));
-  std::filesystem::permissions(directory + "/gcc", std::filesystem::perms::owner_all);
+TEST_F(SystemTest, CompilerOfTheGccFamily) {
+  Write("bin/gcc", "#!/bin/sh\nexit 7\n");
+  std::filesystem::permissions("bin/gcc", std::filesystem::perms::owner_all);
   const std::string path = std::getenv("PATH");
-  SetEnvironment("PATH", directory + ":/bin:/usr/bin");
+  SetEnvironment("PATH", "bin:/bin:/usr/bin");
   EXPECT_EQ(7, RunCommand("cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
-  std::filesystem::rename(directory + "/gcc", directory + "/gcc-4");
+  std::filesystem::rename("bin/gcc", "bin/gcc-4");
   EXPECT_EQ(7, RunCommand("gcc-4 x"));
   SetEnvironment("PATH", path);
-  std::filesystem::remove_all(directory);
 }
 
-TEST(SystemTest, BatchFile) {
-  const std::string path = ::testing::TempDir() + "/qrex_mark.bat", target = ::testing::TempDir() + "/qrex_mark.dep";
-  std::string backslashes = path;
-  for (char& c : backslashes) c = c == '/' ? '\\' : c;
-  ASSERT_TRUE(WriteFile(path, "@echo Updated %TIME% %DATE% >\"" + target + "\"\n"));
-  EXPECT_EQ(0, RunCommand("cmd /c \"" + backslashes + "\""));
-  std::string content;
-  EXPECT_TRUE(ReadFile(target, content));
+TEST_F(SystemTest, BatchFile) {
+  Write("a/mark.bat", "@echo Updated %TIME% %DATE% >\"mark.dep\"\n");
+  EXPECT_EQ(0, RunCommand("cmd /c \"a\\mark.bat\""));
+  const std::string content = Read("mark.dep");
   EXPECT_EQ(0u, content.find("Updated "));
   EXPECT_EQ(std::string::npos, content.find('%'));
-  RemoveFile(path);
-  RemoveFile(target);
-  EXPECT_NE(0, RunCommand("cmd /c \"" + backslashes + "\""));
+  RemoveFile("a/mark.bat");
+  EXPECT_NE(0, RunCommand("cmd /c \"a\\mark.bat\""));
 }
 
-TEST(SystemTest, DeepStack) {
+TEST_F(SystemTest, DeepStack) {
   struct Deep {
     static size_t Recurse(size_t depth) {
       volatile char frame[1024];
@@ -72,27 +63,25 @@ TEST(SystemTest, DeepStack) {
   EXPECT_THROW(RunOnStack(1 << 20, [] { throw 1; }), int);
 }
 
-TEST(SystemTest, Times) {
+TEST_F(SystemTest, Times) {
   constexpr int64_t kTheYear2000 = 125911584000000000, kTenYears = int64_t{10} * 366 * 24 * 3600 * 10000000;
   EXPECT_GT(SystemFileTime(), kTheYear2000 + 2 * kTenYears);
-  const std::string path = ::testing::TempDir() + "/qrex_time";
-  ASSERT_TRUE(WriteFile(path, ""));
+  Write("a/time", "");
   FileInfo info;
-  ASSERT_TRUE(Stat(path, info));
+  ASSERT_TRUE(Stat("a/time", info));
   EXPECT_LT(std::abs(SystemFileTime() - info.writeTime), 100000000);
-  EXPECT_EQ("qrex_time", info.name);
-  RemoveFile(path);
+  EXPECT_EQ("time", info.name);
 }
 
-TEST(ErrorTest, Codes) {
-  const std::string path = ::testing::TempDir() + "/qrex_error";
-  ASSERT_TRUE(WriteFile(path, "x"));
+TEST_F(SystemTest, ErrorCodes) {
+  const std::string path = "f";
   std::string content;
+  Write(path, "x");
   EXPECT_FALSE(ReadFile(path + "none", content));
   EXPECT_EQ(2u, LastError());
   EXPECT_FALSE(ReadFile(path + "/a", content));
   EXPECT_EQ(3u, LastError());
-  EXPECT_FALSE(ReadFile(::testing::TempDir(), content));
+  EXPECT_FALSE(ReadFile(".", content));
   EXPECT_EQ(5u, LastError());
   EXPECT_FALSE(MakeEmptyFile(path, false));
   EXPECT_EQ(80u, LastError());

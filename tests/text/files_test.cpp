@@ -2,10 +2,7 @@
 
 #include "text/files.h"
 
-#include <gtest/gtest.h>
 #include <sys/stat.h>
-
-#include <filesystem>
 
 #include "platform/error.h"
 #include "platform/system.h"
@@ -13,6 +10,7 @@
 #include "text/output_policy.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
+#include "world_fixture.h"
 
 namespace qrex {
 
@@ -65,93 +63,78 @@ TEST(PathsTest, Relative) {
   EXPECT_EQ("../c", RelativePath("a/c", "a/b"));
 }
 
-class FilesTest : public ::testing::Test {
- protected:
-  FilesTest() : root(::testing::TempDir() + "/qrex_files") { std::filesystem::remove_all(root); }
-  ~FilesTest() override { std::filesystem::remove_all(root); }
-  std::string Make(const std::string& name, const std::string& content) {
-    const std::string path = root + "/" + name;
-    CreateDirectories(path, false);
-    ReplaceFile(path, content);
-    return path;
-  }
-  static std::string Content(const std::string& path) {
-    std::string content;
-    return ReadWholeFile(content, path) ? content : "none";
-  }
-  const std::string root;
-};
+using FilesTest = WorldTest;
 
 TEST_F(FilesTest, Directories) {
-  CreateDirectories(root + "/a/b/c.txt", false);
-  EXPECT_TRUE(std::filesystem::is_directory(root + "/a/b"));
-  EXPECT_FALSE(std::filesystem::exists(root + "/a/b/c.txt"));
-  CreateDirectories(root + "/a/d", true);
-  Make("a/.h", "");
-  Make("a/z", "four");
+  CreateDirectories("a/b/c.txt", false);
+  EXPECT_TRUE(std::filesystem::is_directory("a/b"));
+  EXPECT_FALSE(std::filesystem::exists("a/b/c.txt"));
+  CreateDirectories("a/d", true);
+  Write("a/.h", "");
+  Write("a/z", "four");
   std::string list;
   uint32_t sizes = 0;
-  FileOrDirIterator entries(root + "/a/*");
+  FileOrDirIterator entries("a/*");
   while (const IFileOrDirInfo* entry = entries.Next()) {
     list += entry->Name() + (entry->IsDirectory() ? "/" : "") + (entry->IsHidden() ? "h" : "") + " ";
     sizes += entry->IsDirectory() ? 0 : entry->SizeLow();
   }
   EXPECT_EQ("./h ../h .hh b/ d/ z ", list);
   EXPECT_EQ(4u, sizes);
-  EXPECT_EQ(nullptr, FileOrDirIterator(root + "/none/*").Next());
-  EXPECT_FALSE(FileExists(root + "/a"));
-  EXPECT_EQ(0, LastWriteTime(root + "/a"));
+  EXPECT_EQ(nullptr, FileOrDirIterator("none/*").Next());
+  EXPECT_FALSE(FileExists("a"));
+  EXPECT_EQ(0, LastWriteTime("a"));
   FileTimes times;
-  EXPECT_EQ(0, times.LastWriteTime(root + "/a"));
-  EXPECT_EQ(LastWriteTime(root + "/a/z"), times.LastWriteTime(root + "/a/z"));
-  EXPECT_EQ(0, times.LastWriteTime(root + "/none/z"));
+  EXPECT_EQ(0, times.LastWriteTime("a"));
+  EXPECT_EQ(LastWriteTime("a/z"), times.LastWriteTime("a/z"));
+  EXPECT_EQ(0, times.LastWriteTime("none/z"));
 }
 
 TEST_F(FilesTest, Operations) {
-  const std::string path = root + "/f";
+  const std::string path = "f";
+  Write("from", "text");
   EXPECT_FALSE(FileExists(path));
   EXPECT_EQ(0, LastWriteTime(path));
   EXPECT_FALSE(TouchFile(path, false));
-  CreateDirectories(root, true);
   EXPECT_TRUE(CreateEmptyFile(path, false));
   EXPECT_FALSE(CreateEmptyFile(path, false));
   EXPECT_TRUE(CreateEmptyFile(path, true));
   EXPECT_TRUE(FileExists(path));
-  EXPECT_TRUE(TouchFile(root + "/g", true));
-  EXPECT_NEAR(static_cast<double>(CurrentFileTime()), static_cast<double>(LastWriteTime(root + "/g")), 10e7);
-  EXPECT_TRUE(CopyFile(Make("from", "text"), path, false));
-  EXPECT_EQ("text", Content(path));
-  EXPECT_FALSE(CopyFile(root + "/from", path, true));
-  EXPECT_FALSE(CopyFile(root + "/none", path, false));
+  EXPECT_TRUE(TouchFile("g", true));
+  EXPECT_NEAR(static_cast<double>(CurrentFileTime()), static_cast<double>(LastWriteTime("g")), 10e7);
+  EXPECT_TRUE(CopyFile("from", path, false));
+  EXPECT_EQ("text", Read(path));
+  EXPECT_FALSE(CopyFile("from", path, true));
+  EXPECT_FALSE(CopyFile("none", path, false));
   EXPECT_TRUE(SetReadOnly(path, true));
   EXPECT_FALSE(TouchFile(path, false) || DeleteFile(path));
   EXPECT_TRUE(SetReadOnly(path, false));
-  EXPECT_FALSE(SetReadOnly(root + "/none", true));
+  EXPECT_FALSE(SetReadOnly("none", true));
   EXPECT_TRUE(DeleteFile(path));
   EXPECT_FALSE(DeleteFile(path));
   std::string full;
-  EXPECT_TRUE(FullPathOf(root + "/a/../b/./c", full));
-  EXPECT_EQ(root.substr(root.rfind('/')) + "/b/c", full.substr(full.size() - 15));
+  EXPECT_TRUE(FullPathOf("a/../b/./c", full));
+  EXPECT_EQ(std::filesystem::current_path() / "b/c", full);
   EXPECT_FALSE(FullPathOf("", full));
   EXPECT_THROW(FileExists("\xff"), StringConversionException);
 }
 
 TEST_F(FilesTest, WhatIsNoPlainFile) {
-  CreateDirectories(root, true);
-  const std::string pipe = root + "/pipe", link = root + "/link";
+  const std::string pipe = "pipe", link = "link";
   ASSERT_EQ(0, mkfifo(pipe.c_str(), 0666));
-  std::filesystem::create_symlink(Make("file", "text"), link);
+  Write("file", "text");
+  std::filesystem::create_symlink("file", link);
   FileTimes times;
   for (const std::string& path : {pipe, std::string("/dev/null")}) {
     EXPECT_FALSE(FileExists(path) || FileLookup().Exists(path)) << path;
     EXPECT_EQ(0, LastWriteTime(path)) << path;
     EXPECT_EQ(0, times.LastWriteTime(path)) << path;
-    EXPECT_EQ("none", Content(path));
-    EXPECT_FALSE(CopyFile(path, root + "/to", false) || File().Open(path, FileMode::ReadBinary)) << path;
+    EXPECT_EQ("no file " + path, Read(path));
+    EXPECT_FALSE(CopyFile(path, "to", false) || File().Open(path, FileMode::ReadBinary)) << path;
   }
   EXPECT_TRUE(FileExists(link) && LastWriteTime(link) != 0);
   ReplaceFile(pipe, "text");
-  EXPECT_EQ("text", Content(pipe));
+  EXPECT_EQ("text", Read(pipe));
   std::string text = "old";
   EXPECT_TRUE(LoadStream(text, "/dev/null"));
   EXPECT_EQ("", text);
@@ -161,13 +144,13 @@ TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
   std::vector<std::string> paths;
   std::vector<int64_t> times;
   for (int i = 0; i < 1500; ++i) {
-    const std::string name = std::to_string(i % 100) + "/" + std::to_string(i / 100);
-    paths.push_back(i % 3 == 0 ? root + "/" + name : Make(name, ""));
+    paths.push_back(std::to_string(i % 100) + "/" + std::to_string(i / 100));
+    if (i % 3 != 0) Write(paths.back(), "");
     if (i % 3 == 1)
       std::filesystem::last_write_time(paths.back(),
                                        std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
   }
-  paths.push_back(root + "/1");
+  paths.push_back("1");
   for (const std::string& path : paths) times.push_back(LastWriteTime(path));
   EXPECT_EQ(times, LastWriteTimes(paths));
   paths[700] = "\xff";
@@ -175,22 +158,24 @@ TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
 }
 
 TEST_F(FilesTest, LineEnds) {
-  const std::string path = Make("f", "a\r\rb\r\nc\n\r");
+  const std::string path = "f";
+  Write(path, "a\r\rb\r\nc\n\r");
   std::string text;
   EXPECT_TRUE(LoadText(text, path, true));
   EXPECT_EQ("a\n\nb\nc\n\n", text);
   EXPECT_TRUE(LoadText(text, path, false));
   EXPECT_EQ("a\r\rb\r\nc\n\r", text);
-  EXPECT_FALSE(LoadText(text, root, true));
+  EXPECT_FALSE(LoadText(text, ".", true));
   EXPECT_EQ("\r\na\r\n\r\nb", WithCarriageReturns("\na\n\nb"));
 }
 
 TEST_F(FilesTest, CheckedFile) {
-  const std::string path = Make("f", "");
+  const std::string path = "f";
+  Write(path, "");
   std::string payload = "old";
   EXPECT_FALSE(ReadCheckedFile(7, payload, path));
   WriteCheckedFile(7, "123456789", path);
-  std::string bytes = Content(path);
+  std::string bytes = Read(path);
   EXPECT_EQ(std::string("\7\0\0\0\x26\x39\xf4\xcb\x09\0\0\0\0\0\0\0", 16) + "123456789", bytes);
   EXPECT_FALSE(ReadCheckedFile(8, payload, path));
   EXPECT_TRUE(ReadCheckedFile(7, payload, path));
@@ -198,16 +183,17 @@ TEST_F(FilesTest, CheckedFile) {
   const auto readsWith = [&](size_t at, char byte) {
     std::string damaged = bytes;
     damaged[at] = byte;
-    Make("f", damaged);
+    Write(path, damaged);
     return ReadCheckedFile(7, payload, path);
   };
   EXPECT_FALSE(readsWith(20, 'x') || readsWith(15, '\x80') || readsWith(8, 10) || readsWith(4, 0));
-  Make("f", bytes + "behind");
+  Write(path, bytes + "behind");
   EXPECT_TRUE(ReadCheckedFile(7, payload, path));
 }
 
 TEST_F(FilesTest, FileClass) {
-  const std::string path = Make("f", "");
+  const std::string path = "f";
+  Write(path, "");
   File file(path, FileMode::WriteBinary);
   file.Write("abc", 3);
   file.Write("", 0);
@@ -224,10 +210,10 @@ TEST_F(FilesTest, FileClass) {
   EXPECT_EQ(0u, file.Read(bytes, 4));
   EXPECT_THROW(file.Write("x", 1), FileException);
   try {
-    File none(root + "/none", FileMode::ReadText);
+    File none("none", FileMode::ReadText);
     FAIL();
   } catch (const FileException& exception) {
-    EXPECT_EQ("File error (" + root + "/none) : The system cannot find the file specified.", ExceptionText(exception));
+    EXPECT_EQ("File error (none) : The system cannot find the file specified.", ExceptionText(exception));
   }
 }
 

@@ -8,17 +8,17 @@
 
 #include "platform/system.h"
 #include "text/scope_timer.h"
-#include "workspace/workspace_fixture.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
 
-class OutputPolicyTest : public WorkspaceTest {
+class OutputPolicyTest : public WorldTest {
  protected:
-  static int WriteText(const std::string& text, const std::string& path) {
+  int WriteText(const std::string& text, const std::string& path) {
     MemoryTextWriter writer;
     writer << text;
-    return WriteIfChanged(writer, path);
+    return WriteIfChanged(settings.leftovers, writer, path);
   }
   static bool IsReadOnly(const std::string& path) {
     return (std::filesystem::status(path).permissions() & std::filesystem::perms::owner_write) ==
@@ -38,10 +38,28 @@ TEST_F(OutputPolicyTest, WritesWhatDiffers) {
   EXPECT_EQ(0, WriteText("a\nb\n", "x"));
   EXPECT_EQ("a\rb\n", Read("x"));
   EXPECT_EQ(1, WriteText("a\nb", "x"));
+  EXPECT_EQ("Writing x\nSkipping x\nSkipping x\nWriting x\n", trace);
+  for (const char* other : {"a\r\nb\r", "a\nb\r\r", "a\rb\rc", "a\r\n", "", "b\nb"}) {
+    Write("x", other);
+    EXPECT_EQ(1, WriteText("a\nb", "x")) << other;
+  }
+  TakeTrace();
   EXPECT_EQ(1, WriteText("", "empty"));
   EXPECT_EQ(0, WriteText("", "empty"));
-  EXPECT_EQ("Writing x\nSkipping x\nSkipping x\nWriting x\nWriting empty\nSkipping empty\n", trace);
+  EXPECT_EQ("Writing empty\nSkipping empty\n", trace);
   EXPECT_EQ(1, WriteText("a", std::string(255, 'n')));  // there is no room beside it for its name and more
+}
+
+TEST_F(OutputPolicyTest, EachRunSweepsAFolderOnce) {
+  constexpr char kLeftover[] = "y.qrex-4194305.part";  // of a process beyond the highest number
+  for (int run = 0; run < 2; ++run) {
+    LeftoverSweep leftovers;
+    for (const bool isFirst : {true, false}) {
+      Write(kLeftover, "half");
+      leftovers.Beside("x");
+      EXPECT_EQ(isFirst, !FileExists(kLeftover)) << run;
+    }
+  }
 }
 
 TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
@@ -68,7 +86,7 @@ TEST_F(OutputPolicyTest, ReportsWhatCannotBeWritten) {
 TEST_F(OutputPolicyTest, GeneratedTextIsIndentedAndItsLinesEndOnTheWay) {
   const size_t kLengths[] = {0, 1, 50, 4094, 4095, 4096, 5000, 64 << 10, 70000, 0, 255 << 10, 300000, 7};
   for (size_t lines : {size_t{7}, std::size(kLengths)}) {
-    GeneratedFile generated("target");
+    GeneratedFile generated(settings.leftovers, "target");
     std::string expected;
     {
       TextWriter writer(generated);
@@ -99,7 +117,7 @@ TEST_F(OutputPolicyTest, WhatIsGeneratedIsCommittedWholeOrNotAtAll) {
     const rlimit limit{text.size() - missing, before.rlim_max};
     setrlimit(RLIMIT_FSIZE, &limit);
     {
-      GeneratedFile generated("target");
+      GeneratedFile generated(settings.leftovers, "target");
       generated.Write(text.data(), text.size());
       generated.Write(text.data(), 0);
       EXPECT_THROW(generated.Commit(), FileException) << missing;
@@ -113,22 +131,22 @@ TEST_F(OutputPolicyTest, WhatIsGeneratedIsCommittedWholeOrNotAtAll) {
 TEST_F(OutputPolicyTest, CopiesWhatIsNewer) {
   Write("from", "1");
   SetAge("from", 100);
-  EXPECT_TRUE(CopyIfNewer("from", "to/a/b", true));
+  EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "to/a/b", true));
   EXPECT_EQ("1", Read("to/a/b"));
   EXPECT_TRUE(IsReadOnly("to/a/b"));
   EXPECT_GT(LastWriteTime("to/a/b"), LastWriteTime("from") + 90 * 10000000ll);  // the copy is of now
   Write("from", "2");
   SetAge("from", 50);
-  EXPECT_TRUE(CopyIfNewer("from", "to/a/b", false));
+  EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "to/a/b", false));
   EXPECT_EQ("1", Read("to/a/b"));
   SetAge("from", -1);
-  EXPECT_TRUE(CopyIfNewer("from", "to/a/b", false));
+  EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "to/a/b", false));
   EXPECT_EQ("2", Read("to/a/b"));
   EXPECT_FALSE(IsReadOnly("to/a/b"));
-  EXPECT_TRUE(CopyIfNewer("none", "to/a/c", false));
+  EXPECT_TRUE(CopyIfNewer(settings.leftovers, "none", "to/a/c", false));
   EXPECT_FALSE(FileExists("to/a/c"));
   EXPECT_EQ("", trace);
-  EXPECT_FALSE(CopyIfNewer("from", "to/a", false));
+  EXPECT_FALSE(CopyIfNewer(settings.leftovers, "from", "to/a", false));
   EXPECT_EQ("...Copy file failed\n", trace);
 }
 

@@ -2,13 +2,10 @@
 
 #include "text/streams.h"
 
-#include <gtest/gtest.h>
-
 #include <regex>
 
-#include "text/files.h"
 #include "text/stream_adapters.h"
-#include "text/trace.h"
+#include "world_fixture.h"
 
 namespace qrex {
 
@@ -108,64 +105,46 @@ TEST(TextWriterTest, Values) {
   EXPECT_EQ("-1 18446744073709551615 -9223372036854775808 0.1 1e+30 2 Deserialisation errorsv\n", writer.TakeText());
 }
 
-class FileStreamTest : public ::testing::Test {
- protected:
-  FileStreamTest() : path(::testing::TempDir() + "/stream") {}
-  ~FileStreamTest() override {
-    SetReadOnly(path, false);
-    DeleteFile(path);
-  }
-  std::string Content() {
-    std::string content;
-    EXPECT_TRUE(ReadWholeFile(content, path));
-    return content;
-  }
-  const std::string path;
-};
+using FileStreamTest = WorldTest;
 
 TEST_F(FileStreamTest, LineEndsInTextMode) {
-  auto* stream = new OFileStream(path, true);
+  auto* stream = new OFileStream("f", true);
   stream->Write("a\n\nb", 4);
   stream->Write("\n", 1);
   stream->Flush();
   stream->Close();
-  EXPECT_EQ("a\r\n\r\nb\r\n", Content());
-  { OFileStream(path, false).Write("a\n", 2); }
-  EXPECT_EQ("a\n", Content());
-  SetReadOnly(path, true);
+  EXPECT_EQ("a\r\n\r\nb\r\n", Read("f"));
+  { OFileStream("f", false).Write("a\n", 2); }
+  EXPECT_EQ("a\n", Read("f"));
+  SetReadOnly("f", true);
   try {
-    OFileStream refused(path, false);
+    OFileStream refused("f", false);
     FAIL();
   } catch (const FileException& exception) {
-    EXPECT_EQ("File error (" + path + ") : Access is denied.", ExceptionText(exception));
+    EXPECT_EQ("File error (f) : Access is denied.", ExceptionText(exception));
   }
   EXPECT_THROW(OFileStream("a\xff", false), StringConversionException);
 }
 
 TEST_F(FileStreamTest, TraceLog) {
-  struct Hook : TraceHook {
-    void OnTrace(std::string_view text) override { seen.append(text); }
-    std::string seen;
-  } hook;
-  SetTraceHook(&hook);
   CloseTrace();  // what came before is gone
   TraceWriter() << "early\n";
-  EXPECT_FALSE(OpenTrace(path + "/none", false, false));
-  EXPECT_TRUE(OpenTrace(path, false, false));
-  EXPECT_EQ("early\n", Content());
+  EXPECT_FALSE(OpenTrace("none/f", false, false));
+  EXPECT_TRUE(OpenTrace("f", false, false));
+  EXPECT_EQ("early\n", Read("f"));
   {
     TraceIndentScope indent(2);
     TraceWriter() << "a\n\nb" << 1;
   }
   TraceWriter() << "\n";
-  EXPECT_EQ("early\n  a\n\n  b1\n", Content());
-  EXPECT_EQ("early\nearly\n  a\n\n  b1\n", hook.seen);
+  EXPECT_EQ("early\n  a\n\n  b1\n", Read("f"));
+  EXPECT_EQ("early\nearly\n  a\n\n  b1\n", trace);
   CloseTrace();
-  EXPECT_TRUE(OpenTrace(path, true, true));
+  EXPECT_TRUE(OpenTrace("f", true, true));
   TraceWriter() << "x\n";
   EXPECT_TRUE(
-      std::regex_match(Content().substr(16), std::regex("\\d+ \\d\\d/\\d\\d/\\d{4} \\d\\d:\\d\\d:\\d\\d\\.\\d{3} x\n")))
-      << Content();
+      std::regex_match(Read("f").substr(16), std::regex("\\d+ \\d\\d/\\d\\d/\\d{4} \\d\\d:\\d\\d:\\d\\d\\.\\d{3} x\n")))
+      << Read("f");
   CloseTrace();
   OpenTrace("stdout", false, false);
   ::testing::internal::CaptureStdout();
@@ -176,7 +155,6 @@ TEST_F(FileStreamTest, TraceLog) {
   StdioOutputStream().Write("ok", 2);
   EXPECT_EQ("ok", ::testing::internal::GetCapturedStdout());
   CloseTrace();
-  SetTraceHook(nullptr);
 }
 
 }  // namespace qrex

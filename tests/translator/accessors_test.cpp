@@ -1,6 +1,6 @@
 #include <regex>
 
-#include "translate_fixture.h"
+#include "translator/translate_fixture.h"
 
 namespace qrex {
 namespace {

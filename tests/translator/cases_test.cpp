@@ -44,7 +44,7 @@ class CasesTest : public TranslateTest, public ::testing::WithParamInterface<std
   }
 };
 
-TEST_P(CasesTest, GivesWhatIsExpected) {
+TEST_P(CasesTest, GivesWhatIsExpected) try {
   const std::string& name = GetParam();
   settings.compilableText = name.starts_with("compilable_");
   MakeWorld(name.starts_with("dll_") ? TargetType::DynamicLinkLibrary : TargetType::Application);
@@ -54,6 +54,8 @@ TEST_P(CasesTest, GivesWhatIsExpected) {
   Compare(kFolder + name + ".expected.h", Translate("t.h"));
   const std::string translated = Translate("t.cpp");
   Compare(kFolder + name + ".expected.cpp", translated == "#include \"t.h\"\n" ? "" : translated);
+} catch (const IException& exception) {
+  FAIL() << ExceptionText(exception);
 }
 
 INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& info) { return info.param; });

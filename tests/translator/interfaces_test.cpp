@@ -1,4 +1,4 @@
-#include "translate_fixture.h"
+#include "translator/translate_fixture.h"
 
 namespace qrex {
 namespace {

@@ -46,8 +46,7 @@ TEST_F(LoopTest, ImportsBecomeIncludes) {
 
 // A project that is not translated may be included as it is.
 TEST_F(LoopTest, IncludesOfPlainProjects) {
-  AddProject("plain", "plain", TargetType::StaticLibrary).usesQrex = false;
-  AddFileTo(*workspace->projects[2], "plain/p.h", "int p;\n");
+  AddFileTo(AddProject("plain", "Static Library", "{ }"), "plain/p.h", "int p;\n");
   EXPECT_EQ("#include \"plain/p.h\"\n", Translate("t.cpp", "#include \"plain/p.h\"\n"));
   EXPECT_EQ("error : File plain/p.h is not part of a project using qrex", ErrorOf("u.cpp", "@import \"plain/p.h\"\n"));
 }
@@ -160,7 +159,7 @@ TEST_F(LoopTest, LineTable) {
       Translate("t.h", "int a;\n@import \"Vesk/vxObject/IObject.h\"\n\n$struct S\n{\n};\nint b;\n");
   const size_t b =
       static_cast<size_t>(std::count(generated.begin(), generated.begin() + generated.find("int b"), '\n'));
-  const std::string path = "app/src/t.h";
+  const std::string path = "tree/app/src/t.h";
   EXPECT_EQ("none", SourceOf("t.h", 4));
   EXPECT_EQ(path + ":1", SourceOf("t.h", 5));
   EXPECT_EQ(path + ":2", SourceOf("t.h", 6));
@@ -186,21 +185,20 @@ TEST_F(LoopTest, PredefinedVariables) {
       "@is_public_header @is_header @is_cpp @root_to_file_path @filename @filename_without_extension @file_extension "
       "@workspace @project @root_to_projdir_path @platform @system_name @system_processor @system_version "
       "@size_of_pointer @config @api @target_type";
-  EXPECT_EQ(
-      "false false false app/src/t.py t.py t py tree app app x64 Linux x86 6 8 Debug app_API Dynamic-Link Library",
-      Translate("t.py", text));
+  EXPECT_EQ("false false false app/src/t.py t.py t py all app app x64 Linux x86 6 8 Debug app_API Dynamic-Link Library",
+            Translate("t.py", text));
   EXPECT_EQ("false false true", Translate("u.cpp", "@is_public_header @is_header @is_cpp"));
   EXPECT_NE(std::string::npos, Translate("pub/v.h", "@is_public_header @is_header @is_cpp").find("true true false"));
-  EXPECT_EQ(app().rootDir + "/app/src/w.py " + app().rootDir, Translate("w.py", "@file_path @root_path"));
+  EXPECT_EQ(App().rootDir + "/app/src/w.py " + App().rootDir, Translate("w.py", "@file_path @root_path"));
 }
 
 TEST_F(LoopTest, CompilerMacros) {
   const std::string text = "@macros [@macroA] [@macroB] [@macroC]";
-  app().configs.front()->compilerText = "-O2 -DA  -D\"B\" -Wall";
+  App().configs.front()->compilerText = "-O2 -DA  -D\"B\" -Wall";
   EXPECT_EQ("A \"B\" [] [] [@macroC]", Translate("t.py", text));
   settings.compiler = CompilerKind::vc10;
   MakeWorld(TargetType::Application);
-  app().configs.front()->compilerOptions["PreprocessorDefinitions"] = "A;C";
+  App().configs.front()->compilerOptions["PreprocessorDefinitions"] = "A;C";
   EXPECT_EQ("A;C [] [@macroB] []", Translate("t.py", text));
 }
 

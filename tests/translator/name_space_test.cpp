@@ -10,7 +10,7 @@ class NameSpaceTest : public TranslateTest {
   // Translates a new .cpp with the import of IObject.h on its first line: "" or what it fails with.
   std::string Fault(const std::string& text) {
     std::string name = "t.cpp";
-    for (int i = 2; host->FindFile(PathOf(name)); ++i) name = "t" + std::to_string(i) + ".cpp";
+    for (int i = 2; builder->FindFile(PathOf(name)); ++i) name = "t" + std::to_string(i) + ".cpp";
     std::string error = ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
     ReplaceAllInPlace(error, name, "t.cpp");
     return error.compare(0, 8, "no error") == 0 ? "" : error;
@@ -214,7 +214,7 @@ TEST_F(NameSpaceTest, Warnings) {
        "t.h(2) : warning W1005 : mvector<T> is deprecated - instead use xvector<movable<pref<T> > >\n"},
       {"$class+ A;", "t.h(1) : warning W1017 : + on forward declaration of A deprecated\n"},
   });
-  EXPECT_EQ(1, host->warnings);
+  EXPECT_EQ(1, builder->warningCount);
 }
 
 TEST_F(NameSpaceTest, WarningsOfLibraries) {

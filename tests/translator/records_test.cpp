@@ -50,7 +50,7 @@ TEST_F(RecordsTest, PlacesOfTails) {
   EXPECT_EQ("$enum+ Own, $enum+ Free, $enum+ a::b::E", Registered(Translate("own.cpp")));
   EXPECT_EQ("$enum+ Mid", Registered(Translate("other.cpp")));
   EXPECT_EQ("", Messages());
-  EXPECT_EQ((std::vector<std::string>{"Own", "Free", "a::b::E"}), host->RegisterMap().entries["app/src/own.cpp"]);
+  EXPECT_EQ((std::vector<std::string>{"Own", "Free", "a::b::E"}), builder->RegisterMap().entries["app/src/own.cpp"]);
 }
 
 TEST_F(RecordsTest, HeaderOfSameNameNotImported) {
@@ -62,24 +62,23 @@ TEST_F(RecordsTest, HeaderOfSameNameNotImported) {
 }
 
 TEST_F(RecordsTest, ForeignHeadersAreNotRegistered) {
-  Project& lib = AddProject("lib", "lib", TargetType::StaticLibrary);
-  AddFileTo(lib, "lib/x.h", "$enum+ X { x };");
+  AddFileTo(AddProject("lib", "Static Library", "qrex { }"), "lib/x.h", "$enum+ X { x };");
   EXPECT_EQ("", Registered(Translate("t.cpp", "@import \"lib/x.h\"\n")));
-  EXPECT_TRUE(host->RegisterMap().entries.empty());
+  EXPECT_TRUE(builder->RegisterMap().entries.empty());
 }
 
 TEST_F(RecordsTest, MainFileOfWindowsLibrary) {
   settings.systemName = "Windows";
   MakeWorld(TargetType::DynamicLinkLibrary);
-  AddProject("stat", "libs/stat", TargetType::StaticLibrary);
-  AddProject("dyn", "libs/dyn", TargetType::DynamicLinkLibrary);
-  AddProject("tool", "tool", TargetType::ConsoleApplication);
-  AddProject("plain", "plain", TargetType::StaticLibrary).usesQrex = false;
-  app().subprojects = {"libs/dyn/src/dyn.qrpj", "tool/src/tool.qrpj", "plain/src/plain.qrpj", "none/src/none.qrpj",
+  AddProject("libs/stat", "Static Library", "qrex { }");
+  AddProject("libs/dyn", "Dynamic-Link Library", "qrex { }");
+  AddProject("tool", "Console Application", "qrex { }");
+  AddProject("plain", "Static Library", "{ }");
+  App().subprojects = {"libs/dyn/src/dyn.qrpj", "tool/src/tool.qrpj", "plain/src/plain.qrpj", "none/src/none.qrpj",
                        "libs/stat/src/stat.qrpj"};
-  host->RegisterMap().Update("app/src/b.cpp", {"n::m::B", "C"});
-  host->RegisterMap().Update("app/src/a.cpp", {"A"});
-  host->UnregisterMap().Update("app/src/a.cpp", {"n::a0"});
+  builder->RegisterMap().Update("app/src/b.cpp", {"n::m::B", "C"});
+  builder->RegisterMap().Update("app/src/a.cpp", {"A"});
+  builder->UnregisterMap().Update("app/src/a.cpp", {"n::a0"});
   const std::string registerText =
       "\nextern \"C\" __declspec(dllimport) void Register_Project_dyn();\nvoid Register_Project_stat();\n"
       "\nvoid _Register_A(); \nnamespace n { namespace m { void _Register_B(); }}\nvoid _Register_C(); \n"
@@ -110,19 +109,15 @@ TEST_F(RecordsTest, TokenEquivalentOutputStays) {
   ScannedFile& file = Scanned("t.c");
   auto write = [&](const std::string& text) {
     trace.clear();
-    file.translated = false;
-    file.needsWriting = true;
-    ReplaceFile(file.SourcePath(), text);
-    BringUpToDate(file);
+    Write(file.SourcePath(), text);
+    Translate("t.c");
     EXPECT_FALSE(file.needsWriting);
-    std::string written;
-    ReadWholeFile(written, host->TranslatedPath(file));
-    return written;
+    return Read(builder->TranslatedPath(file));
   };
   EXPECT_EQ("int a; // one\r\n", write("int a; // one\n"));
-  EXPECT_EQ("Writing: translated/t.c\n", Messages());
+  EXPECT_EQ("Writing: qrexsource/x64/Debug/t.c\n", Messages());
   EXPECT_EQ("int a; // one\r\n", write("int /* two */ a;\n\n"));
-  EXPECT_EQ("Token equivalent: translated/t.c\n", Messages());
+  EXPECT_EQ("Token equivalent: qrexsource/x64/Debug/t.c\n", Messages());
   EXPECT_EQ("int b;", write("int b;"));
 }
 

@@ -1,142 +1,55 @@
-// Translates given texts: a library project of files that live in a folder of the test's own, with a host that keeps
-// what the translator tells it.
+// Translates given texts, as files of a project.
 #pragma once
 
-#include <gtest/gtest.h>
-
 #include <algorithm>
-#include <cctype>
-#include <filesystem>
-#include <map>
-#include <memory>
 #include <sstream>
 #include <string>
 #include <vector>
 
-#include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
-#include "text/trace.h"
 #include "translator/file/translate_file.h"
 #include "translator/reader/qrex_parser.h"
-#include "workspace/workspace.h"
+#include "workspace/project_parser.h"
+#include "world_fixture.h"
 
 namespace qrex {
-
-class TestHost : public TranslationHost {
- public:
-  TestHost(Workspace& workspace, ProjectConfig& config) : m_workspace(workspace), m_config(config) {}
-  const ConfigSettings& Settings() const override { return m_workspace.settings; }
-  const ProjectConfig& Config() const override { return m_config; }
-  ProjectFile* FindFile(const std::string& path) const override {
-    for (const auto& project : m_workspace.projects) {
-      auto found = project->filesByPath.find(path);
-      if (found != project->filesByPath.end()) return found->second.get();
-    }
-    return nullptr;
-  }
-  ScannedFile& GetScannedFile(ProjectFile& file) override {
-    auto& slot = m_files[file.path];
-    if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
-    return *slot;
-  }
-  std::string TranslatedPath(const ScannedFile& file) const override {
-    return file.file.project->rootDir + "/translated/" + file.file.path;
-  }
-  bool RegisterGuid(const guid& id, const std::string& owner, std::string& existing) override {
-    auto [entry, isNew] = m_guids.emplace(id, owner);
-    existing = entry->second;
-    return isNew;
-  }
-  DeclarationRegistry& RegisterMap() override { return m_register; }
-  DeclarationRegistry& UnregisterMap() override { return m_unregister; }
-  SymbolIndex& Symbols() override { return m_symbols; }
-  size_t NextFileIndex() override { return m_nextIndex++; }
-  void CountWarning() override { ++warnings; }
-  bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const override {
-    for (const auto& [name, file] : m_files) {
-      TextRange text{std::string_view(file->sourceText)};
-      if (text.Empty() || !text.Contains(position)) continue;
-      path = file->file.path;
-      line = LineOfPosition(text, position);
-      return true;
-    }
-    return false;
-  }
-
-  int warnings = 0;
-
- private:
-  Workspace& m_workspace;
-  ProjectConfig& m_config;
-  SymbolIndex m_symbols;
-  std::map<std::string, std::unique_ptr<ScannedFile>> m_files;
-  std::map<guid, std::string> m_guids;
-  DeclarationRegistry m_register{true};
-  DeclarationRegistry m_unregister{false};
-  size_t m_nextIndex = 0;
-};
 
 // The world of a test is a workspace of the project `app` and the companion runtime `vxObject` with
 // Vesk/vxObject/IObject.h. A file of `app` stands under app/src/ unless its name holds a slash (then under app/: of a
 // library, these are the public headers). Paths in messages are printed relative to app/src/, or else to the tree.
-class TranslateTest : public ::testing::Test, public TraceHook {
+class TranslateTest : public WorldTest {
  protected:
   TranslateTest() {
-    SetTraceHook(this);
-    settings.systemName = "Linux";
-    settings.platform = "x64";
-    settings.config = "Debug";
-    settings.compiler = CompilerKind::gcc;
+    configs = "";  // the first text of `app` has one, what extends it has none
     MakeWorld(TargetType::Application);
   }
-  ~TranslateTest() override {
-    SetTraceHook(nullptr);
-    host.reset();
-    std::filesystem::remove_all(m_root);
-  }
 
-  // A new world without files, in which `app` is of that kind.
+  // A new world in which `app` is of that kind and has no files.
   void MakeWorld(TargetType target) {
-    host.reset();
-    trace.clear();
-    const auto& test = *::testing::UnitTest::GetInstance()->current_test_info();
-    m_root = ::testing::TempDir() + "/" + test.test_suite_name() + "." + test.name();
-    std::filesystem::remove_all(m_root);
-    workspace = std::make_unique<Workspace>(settings);
-    workspace->name = "tree";
-    AddProject("app", "app", target);
-    AddProject("vxObject", "Vesk/vxObject", TargetType::UtilityProject);
-    AddFileTo(*workspace->projects[1], "Vesk/vxObject/IObject.h",
+    Load({});
+    AddProject("app", TargetTypeName(target), "config { \"Debug|x64\" } qrex { }");
+    AddFileTo(AddProject("Vesk/vxObject", "Utility Project", "qrex { }"), "Vesk/vxObject/IObject.h",
               "namespace vesk\n{\n$interface+ IObject\n{\n};\n$interface+ IPersistable : IObject\n{\n};\n}\n");
-    host = std::make_unique<TestHost>(*workspace, *app().configs.front());
+    StartBuild();
+    trace.clear();
   }
-
-  void OnTrace(std::string_view text) override { trace.append(text); }
-  Project& app() { return *workspace->projects.front(); }
 
   static std::string PathOf(const std::string& name) {
     return (name.find('/') == std::string::npos ? "app/src/" : "app/") + name;
   }
-  void AddFile(const std::string& name, const std::string& text) { AddFileTo(app(), PathOf(name), text); }
-  ScannedFile& Scanned(const std::string& name) { return host->GetScannedFile(*host->FindFile(PathOf(name))); }
+  void AddFile(const std::string& name, const std::string& text) { AddFileTo(App(), PathOf(name), text); }
+  ScannedFile& Scanned(const std::string& name) { return World::Scanned(PathOf(name)); }
 
   // The generated text. Throws what the translation throws. A header and its .cpp must both be there before the first
   // of them is translated.
   std::string Translate(const std::string& name) {
-    app().CollectFiles();
+    App().CollectFiles();
     ScannedFile& file = Scanned(name);
-    LoadText(file.sourceText, file.SourcePath(), true);
-    file.translated = true;
-    std::string text;
-    struct Target : IOutputStream {
-      explicit Target(std::string& out) : out(out) {}
-      void Write(const void* data, size_t n) override { out.append(static_cast<const char*>(data), n); }
-      void Flush() override {}
-      std::string& out;
-    } target(text);
-    TranslateFile(file, target);
-    return text;
+    file.translated = false;
+    file.needsWriting = true;
+    BringUpToDate(file);
+    return ReadText(builder->TranslatedPath(file));
   }
   std::string Translate(const std::string& name, const std::string& text) {
     AddFile(name, text);
@@ -150,7 +63,7 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     std::string header, tail;
   };
   Generated TranslateHeader(const std::string& text) {
-    MakeWorld(app().targetType);
+    MakeWorld(App().targetType);
     AddFile("t.h", "@import \"Vesk/vxObject/IObject.h\"\n" + text);
     AddFile("t.cpp", "@import \"t.h\"\n");
     Generated generated;
@@ -252,54 +165,27 @@ class TranslateTest : public ::testing::Test, public TraceHook {
 
   std::string Messages() const { return WithShortPaths(trace); }  // all that was printed
 
-  Project& AddProject(const std::string& name, const std::string& directory, TargetType type) {
-    workspace->projects.push_back(std::make_unique<Project>(*workspace));
-    Project& project = *workspace->projects.back();
-    project.name = name;
-    project.rootFolder.name = name;
-    project.usesQrex = true;
-    project.targetType = type;
-    project.rootDir = m_root;
-    project.rootToProjDir = directory;
-    project.sourceDir = directory + "/src";
-    project.configs.push_back(std::make_unique<ProjectConfig>());
-    project.configs.back()->name = "Debug";
-    project.configs.back()->platform = "x64";
-    return project;
-  }
-
+  // The project's text now lists this file; the files that it listed before stay as they are.
   void AddFileTo(Project& project, const std::string& path, const std::string& text) {
     ASSERT_FALSE(project.filesByPath.count(path)) << path << " is there already: use a new world";
-    auto file = std::make_unique<ProjectFile>();
-    file->project = &project;
-    file->path = path;
-    file->name = std::string(FileNameOf(path));
-    StemOf(file->name, file->stem);
-    file->extension = file->name.substr(std::min(file->stem.size() + 1, file->name.size()));
-    file->kind = FileKindOf(file->extension);
-    file->isMainSource = file->kind == FileKind::Cpp && file->stem == project.name;
-    file->isPublicHeader = file->kind == FileKind::H && IsLibrary(project.targetType) &&
-                           path.compare(0, project.sourceDir.size(), project.sourceDir) != 0;
-    project.rootFolder.files.push_back(file.get());
-    project.filesByPath[path] = std::move(file);
+    Write("tree/" + path, text);
+    const std::string entry = path.substr(project.rootToProjDir.size() + 1);
+    WriteProject(project.rootToProjDir, TargetTypeName(project.targetType),
+                 "{ \"" + entry + "\" as \"" + std::string(FileNameOf(entry)) + "\" }");
+    ASSERT_TRUE(LoadProjectFile(project, ProjectPathOf(project.rootToProjDir))) << trace;
     project.filesCollected = false;
     project.folders.clear();
-    CreateDirectories(m_root + "/" + path, false);
-    ReplaceFile(m_root + "/" + path, text);
+    ProjectFile& file = *project.filesByPath.at(path);
+    workspace->fileMap[file.path] = &file;
   }
-
-  ConfigSettings settings;
-  std::unique_ptr<Workspace> workspace;
-  std::unique_ptr<TestHost> host;
-  std::string trace;  // what was written to the trace log
 
  private:
   std::string ErrorInNewWorld(const std::string& name, const std::string& text) {
-    MakeWorld(app().targetType);
+    MakeWorld(App().targetType);
     return ErrorOf(name, "@import \"Vesk/vxObject/IObject.h\" " + text);
   }
   std::string WithShortPaths(std::string text) const {
-    ReplaceAllInPlace(text, m_root + "/", "");
+    ReplaceAllInPlace(text, "tree/", "");
     ReplaceAllInPlace(text, "app/src/", "");
     return text;
   }
@@ -310,8 +196,6 @@ class TranslateTest : public ::testing::Test, public TraceHook {
     ASSERT_TRUE(text.size() >= foot.size() && text.compare(text.size() - foot.size(), foot.size(), foot) == 0) << text;
     text.erase(text.size() - foot.size());
   }
-
-  std::string m_root;
 };
 
 }  // namespace qrex

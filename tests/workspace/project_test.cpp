@@ -4,7 +4,7 @@
 
 #include "text/output_policy.h"
 #include "workspace/file_filter.h"
-#include "workspace/workspace_fixture.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
@@ -34,18 +34,18 @@ std::string Printed(const OptionMap& options) {
   return text;
 }
 
-class ProjectTest : public WorkspaceTest {
+class ProjectTest : public WorldTest {
  protected:
+  ProjectTest() { settings.virtualTree = {"tree", "more"}; }
+
   Project* TryLoad(const std::string& text) {
-    Restart();
     trace.clear();
     Write("tree/app/src/app.qrpj", text);
-    return workspace->LoadProject("app/src/app.qrpj");
+    return World::Load({"app"}) ? &App() : nullptr;
   }
   Project& Load(const std::string& text) {
-    Project* project = TryLoad(text);
-    EXPECT_TRUE(project) << text << trace;
-    return project ? *project : *workspace->projects.front();
+    EXPECT_TRUE(TryLoad(text)) << text << trace;
+    return App();
   }
   void AssertTree(const std::string& tree, const std::string& expected) {
     EXPECT_EQ(expected, Printed(Load(kHeads + tree).rootFolder)) << tree;
@@ -205,8 +205,9 @@ TEST_F(ProjectTest, Names) {
                                 "{ \"app.CPP\" \"p.h\" \"src\" { \"q.H\" \"r.Py\" \".x\" \"noext\" } }");
   std::string kinds;
   for (const auto& [path, file] : project.filesByPath) {
-    kinds += path + " " + file->stem + " " + file->extension + " " + std::to_string(static_cast<int>(file->kind)) +
-             (file->isMainSource ? " main" : "") + (file->isPublicHeader ? " public\n" : "\n");
+    kinds += std::string(path) + " " + file->stem + " " + file->extension + " " +
+             std::to_string(static_cast<int>(file->kind)) + (file->isMainSource ? " main" : "") +
+             (file->isPublicHeader ? " public\n" : "\n");
   }
   EXPECT_EQ(
       "app/app.CPP app cpp 2 main\napp/p.h p h 3 public\napp/src/.x .x x 0\napp/src/noext noext  0\napp/src/q.H q h 3\n"

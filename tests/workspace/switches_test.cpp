@@ -1,12 +1,10 @@
 // Switch blocks and linker texts: what they say as properties, how configurations and files take them over, and how
 // they come back as command lines.
 
-#include <gtest/gtest.h>
-
-#include "text/trace.h"
+#include "message_of.h"
 #include "workspace/linker_text.h"
 #include "workspace/switch_blocks.h"
-#include "workspace/workspace.h"
+#include "world_fixture.h"
 
 namespace qrex {
 
@@ -19,12 +17,8 @@ class PlainParser : public MpfwParser {
   void OnImportedFile(MpfwSourceFile&) override {}
 };
 
-class SwitchesTest : public ::testing::Test, public TraceHook {
+class SwitchesTest : public WorldTest {
  protected:
-  SwitchesTest() { SetTraceHook(this); }
-  ~SwitchesTest() override { SetTraceHook(nullptr); }
-  void OnTrace(std::string_view text) override { trace.append(text); }
-
   enum Block { kAddCpp, kRemoveCpp, kAddRc, kRemoveRc };
   SwitchChanges Read(Block block, const std::string& text) {
     PlainParser parser(settings.context);
@@ -43,11 +37,7 @@ class SwitchesTest : public ::testing::Test, public TraceHook {
     return text;
   }
   std::string ErrorOf(Block block, const std::string& text) {
-    try {
-      return "no error, but " + Text(Read(block, text).entries);
-    } catch (const LexScannerException& exception) {
-      return exception.message;
-    }
+    return MessageOf([&] { return "no error, but " + Text(Read(block, text).entries); });
   }
   void AssertRead(Block block, const std::string& switches, const std::string& expected) {
     ASSERT_EQ(expected, Text(Read(block, "{ " + switches + " }").entries)) << switches;
@@ -69,15 +59,11 @@ class SwitchesTest : public ::testing::Test, public TraceHook {
   }
   std::string Archived(const std::string& text) { return Parsed(text, CompilerKind::gcc, ParseLibrarianText); }
 
-  ConfigSettings settings;
-  std::string trace;
-
  private:
   std::string Parsed(const std::string& text, CompilerKind compiler,
                      void (*parse)(const Project&, const ProjectConfig&, OptionMap&)) {
     settings.compiler = compiler;
-    Workspace workspace(settings);
-    Project project(workspace);
+    Project project(*workspace);
     ProjectConfig config;
     config.linkerText = text;
     OptionMap options;
@@ -256,12 +242,7 @@ TEST_F(SwitchesTest, LinkerTokens) {
   using Tokens = std::vector<std::string>;
   ASSERT_EQ((Tokens{"/A", "/B:\"x y\"z", "\"q\\\" r\"", "c"}), LinkerTokens("  /A\t/B:\"x y\"z \"q\\\" r\"\n\vc "));
   ASSERT_EQ(Tokens{}, LinkerTokens(" \r\n"));
-  try {
-    LinkerTokens("/OUT:\"a b");
-    FAIL();
-  } catch (const LexScannerException& exception) {
-    ASSERT_EQ("Met EOS within switch after reading \"a b", exception.message);
-  }
+  ASSERT_EQ("Met EOS within switch after reading \"a b", MessageOf([] { LinkerTokens("/OUT:\"a b"); }));
 }
 
 TEST_F(SwitchesTest, LinkerProperties) {
@@ -324,19 +305,6 @@ TEST_F(SwitchesTest, StrangeLinkerArguments) {
 
 class LibrariesTest : public SwitchesTest {
  protected:
-  LibrariesTest() : workspace(settings) { settings.exportLib = "lib"; }
-
-  Project& AddProject(const std::string& name, TargetType type, const std::vector<std::string>& subprojects = {}) {
-    Project& project = *workspace.projects.emplace_back(std::make_unique<Project>(workspace));
-    project.name = name;
-    project.rootDir = "root";
-    project.targetType = type;
-    for (const std::string& subproject : subprojects) project.subprojects.push_back(subproject + ".qrpj");
-    ProjectConfig& config = *project.configs.emplace_back(std::make_unique<ProjectConfig>());
-    config.name = "Debug";
-    config.platform = "x64";
-    return project;
-  }
   std::string Gathered(const Project& project, LibraryChoice choice) {
     std::set<std::string> libraries;
     GatherLibraries(project, *project.configs.front(), choice, libraries);
@@ -344,30 +312,27 @@ class LibrariesTest : public SwitchesTest {
     for (const std::string& library : libraries) text += library + " ";
     return text;
   }
-
-  Workspace workspace;
 };
 
 TEST_F(LibrariesTest, StaticSubprojectsBringTheirsAlong) {
-  const auto kStatic = TargetType::StaticLibrary, kDynamic = TargetType::DynamicLinkLibrary;
-  Project& app = AddProject("app", TargetType::Application, {"base", "dll", "tool", "gone"});
-  AddProject("base", kStatic, {"deep", "base"}).configs.front()->linkerText = "/X \"ws2.lib\" \"kernel32.lib\"";
-  AddProject("deep", kStatic).exported = true;
-  AddProject("dll", kDynamic, {"hidden"}).configs.front()->linkerText = "\"hidden.lib\"";
-  AddProject("hidden", kStatic);
-  AddProject("tool", TargetType::UtilityProject);
-
-  ASSERT_EQ("kernel32.lib lib/x64/Debug/base.lib lib/x64/Debug/dll.lib root/x64/Debug/deep.lib ws2.lib ",
+  WriteProject("base", "Static Library", "subproj { \"deep\" \"base\" } +link { /X \"ws2.lib\" \"kernel32.lib\" } { }");
+  WriteProject("deep", "Static Library", "export { }");
+  WriteProject("dll", "Dynamic-Link Library", "subproj { \"hidden\" } +link { \"hidden.lib\" } { }");
+  WriteProject("hidden", "Static Library", "{ }");
+  WriteProject("tool", "Utility Project", "{ }");
+  Project& app = AddProject("app", "Application", "subproj { \"base\" \"dll\" \"tool\" } { }");
+  app.AddSubproject("gone.qrpj");
+  ASSERT_EQ("kernel32.lib lib/x64/Debug/base.lib lib/x64/Debug/dll.lib tree/x64/Debug/deep.lib ws2.lib ",
             Gathered(app, {}));
   ASSERT_EQ("Error : Can't find subproject gone.qrpj under project app\n", trace);
   const LibraryChoice forGenerators{.skipDefaultLibraries = true, .forBuild = false};
-  ASSERT_EQ("root/x64/Debug/deep.lib ws2.lib ", Gathered(app, forGenerators));
-  workspace.FindProjectByName("dll")->configs.front()->compilerOptions["ManagedExtensions"] = "1";
-  workspace.FindProjectByName("base")->configs.front()->compilerOptions["ManagedExtensions"] = "0";
-  ASSERT_EQ("lib/x64/Debug/dll.lib root/x64/Debug/deep.lib ws2.lib ", Gathered(app, forGenerators));
+  ASSERT_EQ("tree/x64/Debug/deep.lib ws2.lib ", Gathered(app, forGenerators));
+  workspace->FindProjectByName("dll")->configs.front()->compilerOptions["ManagedExtensions"] = "1";
+  workspace->FindProjectByName("base")->configs.front()->compilerOptions["ManagedExtensions"] = "0";
+  ASSERT_EQ("lib/x64/Debug/dll.lib tree/x64/Debug/deep.lib ws2.lib ", Gathered(app, forGenerators));
 
   trace.clear();
-  workspace.FindProjectByName("base")->configs.front()->name = "Release";
+  workspace->FindProjectByName("base")->configs.front()->name = "Release";
   Gathered(app, {});
   ASSERT_EQ(
       "Error : Can't find config Debug|x64 in project base\nError : Can't find subproject gone.qrpj under project "

@@ -3,7 +3,7 @@
 #include "driver/run_workspace.h"
 #include "generators/exported_project.h"
 #include "text/guid.h"
-#include "workspace/workspace_fixture.h"
+#include "world_fixture.h"
 
 namespace qrex {
 namespace {
@@ -16,7 +16,7 @@ std::string Printed(Work work) {
   return ::testing::internal::GetCapturedStdout();
 }
 
-class WorkspaceFileTest : public WorkspaceTest {
+class WorkspaceFileTest : public WorldTest {
  protected:
   // What the whole run writes, timing lines and project headings left out.
   std::string Run(const std::string& text, bool succeeds) {
@@ -35,6 +35,7 @@ class WorkspaceFileTest : public WorkspaceTest {
 };
 
 TEST_F(WorkspaceFileTest, Tree) {
+  settings.virtualTree = {"tree", "more"};
   for (const char* name : {"base", "app", "ui", "deep"}) WriteProject(name, "{ }");
   Write("tree/sub/more.QRWS", "@import \"common.inc\" \"dropped\" { later } behind }");
   Write("more/common.inc", "@def later = \"deep\"\n \"ui\"");
@@ -75,12 +76,13 @@ TEST_F(WorkspaceFileTest, Messages) {
   EXPECT_EQ("", Run("\"all\" { }", true));
 }
 
-class GraphTest : public WorkspaceTest {
+class GraphTest : public WorldTest {
  protected:
-  void Load(std::initializer_list<const char*> entries) {
-    Restart();
-    trace.clear();
-    for (const char* entry : entries) workspace->LoadProject(ProjectPathOf(entry));
+  // The names of the projects in their order.
+  std::string ProjectNames() const {
+    std::string names;
+    for (const auto& project : workspace->projects) names += (names.empty() ? "" : " ") + project->name;
+    return names;
   }
   std::string Sort() {
     return Printed([&] { workspace->SortProjects(); });
@@ -161,11 +163,11 @@ TEST_F(GraphTest, Identifiers) {
 }
 
 TEST_F(GraphTest, FileLists) {
-  Write("tree/app/src/app.qrpj",
-        "$TARGET_TYPE = \"Application\" $ROOT_TO_PROJDIR = \"app\" config { \"Debug|x64\" }\n"
-        "{ \"app.cpp\" \"z.cpp\" \"m.asm\" \"n.txt\" \"no.h\" : exclude \"p1.cpp\" : +cpp { /Yc\"p.h\" }\n"
-        "\"src\" { \"a.h\" \"p2.cpp\" : +cpp { /Yc\"p.h\" } \"deep\" { \"d.c\" \"a.cpp\" } \"k.cpp\" \"l.asm\" } \"o\" "
-        "{ \"a.h\" \"app.cpp\" } }");
+  WriteProject(
+      "app",
+      "{ \"app.cpp\" \"z.cpp\" \"m.asm\" \"n.txt\" \"no.h\" : exclude \"p1.cpp\" : +cpp { /Yc\"p.h\" }\n"
+      "\"src\" { \"a.h\" \"p2.cpp\" : +cpp { /Yc\"p.h\" } \"deep\" { \"d.c\" \"a.cpp\" } \"k.cpp\" \"l.asm\" } \"o\" "
+      "{ \"a.h\" \"app.cpp\" } }");
   settings.compiler = CompilerKind::vc9;
   Load({"app"});
   EXPECT_TRUE(workspace->CheckFileReferences());
@@ -198,12 +200,9 @@ TEST_F(GraphTest, References) {
 }
 
 TEST_F(GraphTest, DefinesOfStaticLibraries) {
-  Write("tree/lib.qrpj", "$TARGET_TYPE = \"Static Library\" $ROOT_TO_PROJDIR = \"Lib\" config { \"a|b\" } { }");
-  Write("tree/x/lib2.qrpj",
-        "$TARGET_TYPE = \"Static Library\" $ROOT_TO_PROJDIR = \"lib2\" config { \"a|b\" } subproj { \"x/Lib.qrpj\" } { "
-        "}");
-  std::filesystem::rename("tree/lib.qrpj", "tree/x/Lib.qrpj");
-  WriteProject("app", "subproj { \"x/lib2.qrpj\" } { }");
+  WriteProject("Lib", "Static Library", "{ }");
+  WriteProject("lib2", "Static Library", "subproj { \"Lib\" } { }");
+  WriteProject("app", "subproj { \"lib2\" } { }");
   Load({"app"});
   EXPECT_TRUE(workspace->CheckFileReferences());
   auto defines = [&](const char* name) { return Named(name).configs[0]->compilerOptions["PreprocessorDefinitions"]; };

@@ -17,6 +17,7 @@ enum EReflectedCode {
   RC_VARIANT,
   RC_FUNCTION,
   RC_UNRESOLVED,
+  RC_NAMED_END,  // those of named types stand ahead of it
   RC_VOLATILE = 48,
   RC_CONST,
   RC_ASSIGNABLE,

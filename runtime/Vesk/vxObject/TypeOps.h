@@ -37,15 +37,28 @@ void ConstructArray(T* array, ssize_t begin, ssize_t end) {
   for (ssize_t i = begin; i < end; ++i) new (array + i) T();
 }
 
+// A container of keys that have no order is always empty, and not every standard library can copy it.
+template <typename T, typename = void>
+constexpr bool IsEverEmpty = false;
+template <typename T>
+constexpr bool IsEverEmpty<T, std::enable_if_t<ContainerTraits<T>::keyed>> = !HasLess<typename T::key_type>;
+
 template <typename T>
 void CopyConstructArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
-  for (ssize_t i = begin; i < end; ++i) new (array + at++) T(source[i]);
+  for (ssize_t i = begin; i < end; ++i, ++at) {
+    if constexpr (IsEverEmpty<T>) {
+      new (array + at) T();
+    } else {
+      new (array + at) T(source[i]);
+    }
+  }
 }
 
 template <typename T>
 void AssignArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
   for (ssize_t i = begin; i < end; ++i, ++at) {
-    if constexpr (std::is_copy_assignable<T>::value || !std::is_copy_constructible<T>::value) {
+    if constexpr (IsEverEmpty<T>) {
+    } else if constexpr (std::is_copy_assignable<T>::value || !std::is_copy_constructible<T>::value) {
       array[at] = source[i];
     } else if (array + at != source + i) {  // it has const fields
       array[at].~T();

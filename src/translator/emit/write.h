@@ -80,7 +80,6 @@ class TextPieces {
   const Piece* begin() const { return m_pieces.data(); }
   const Piece* end() const { return m_pieces.data() + m_count; }
 
- protected:
   // `names` ends with an empty one.
   constexpr TextPieces(const char* raw, const std::string_view* names) : m_names(names) {
     std::string_view text(raw);
@@ -164,12 +163,11 @@ class TextPieces {
 };
 
 template <typename... Holes>
-class EmittedText : public TextPieces {
- public:
-  consteval EmittedText(const char* raw) : TextPieces(raw, kNames) {}
+struct EmittedText {
+  consteval EmittedText(const char* raw) : pieces(raw, kNames) {}
 
- private:
   static constexpr std::string_view kNames[] = {Holes::kName..., {}};
+  const TextPieces pieces;  // no base: clang 14 crashes on a constant of a derived class
 };
 
 // What else can fill a hole has an overload of its own, declared ahead of the emitter.
@@ -216,8 +214,8 @@ void FillHole(TextWriter& out, const T& value, bool isLine, size_t blanks) {
 
 template <typename... Holes>
 void Write(TextWriter& out, const std::type_identity_t<EmittedText<Holes...>>& text, const Holes&... holes) {
-  for (const auto& piece : text) {
-    if (piece.length > 0) out << text.PartOf(piece);
+  for (const auto& piece : text.pieces) {
+    if (piece.length > 0) out << text.pieces.PartOf(piece);
     if (piece.hole < 0) continue;
     [[maybe_unused]] int index = 0;
     ((index++ == piece.hole ? FillHole(out, holes.value, piece.isLine, piece.blanks) : void()), ...);

@@ -220,7 +220,7 @@ void WriteTranslation(ScannedFile& file, const std::string& target) {
   }
   const std::vector<ScannedFile*> knownImports = std::move(file.imports);
   file.ForgetTranslation();
-  GeneratedFile generated(target);
+  GeneratedFile generated(file.host.Settings().leftovers, target);
   DiscardStream discarded;
   IOutputStream& out = file.needsWriting ? static_cast<IOutputStream&>(generated) : discarded;
   try {
@@ -251,6 +251,7 @@ void WriteTranslation(ScannedFile& file, const std::string& target) {
 bool CopySource(const ScannedFile& file, const std::string& target) {
   ChangeReadOnly(target, false);
   CreateDirectories(target, false);
+  file.host.Settings().leftovers.Beside(target);
   if (!CopyFile(file.SourcePath(), target, false)) {
     const SystemException failure;
     TraceWriter() << "ERROR: Copy file " << file.SourcePath() << " to " << target << " failed\n";

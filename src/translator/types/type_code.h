@@ -40,6 +40,7 @@ enum TypeOp : uint8_t {
   kOpVariant,
   kOpGlobalFunction,
   kOpCppText,
+  kOpNamedEnd,  // those of named types stand ahead of it
   kOpVolatile = 48,
   kOpConst,
   kOpAssignable,

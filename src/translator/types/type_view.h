@@ -24,7 +24,7 @@ class TypeView {
   TypeOp Op() const { return m_code.empty() ? kOpVoid : static_cast<TypeOp>(static_cast<uint8_t>(m_code.front())); }
   bool IsMetadata() const { return Op() >= kOpMetaBool; }
   bool IsBuiltIn() const { return Op() <= kOpString16; }
-  bool IsNamed() const { return Op() >= kOpClass && Op() <= kOpCppText; }
+  bool IsNamed() const { return Op() >= kOpClass && Op() < kOpNamedEnd; }
   bool IsDecorator() const { return Op() >= kOpVolatile && Op() <= kOpOffsettable; }
   bool IsTemplate() const { return Op() >= kOpPtr && Op() <= kOpDynArray; }  // written NAME<T>
   bool HasInner() const { return Op() >= kOpVolatile && !IsMetadata(); }

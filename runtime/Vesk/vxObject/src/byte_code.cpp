@@ -17,7 +17,7 @@ class ByteCodeReader {
     while (*m_at >= RC_METADATA) type.m_metadata.push_back(ReadMetadata());
     type.m_code = *m_at++;
     if (type.m_code <= RC_STRING16) return type;
-    if (type.m_code <= RC_UNRESOLVED) {
+    if (type.m_code < RC_NAMED_END) {
       type.m_name = ReadName();
       return type;
     }

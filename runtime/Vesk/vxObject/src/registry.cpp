@@ -121,17 +121,6 @@ void UnregisterRecords(XTarget const* target) {
   }
 }
 
-void UnregisterTarget(XTarget const* target) {
-  UnregisterRecords<ReflectedClass>(target);
-  UnregisterRecords<ReflectedInterface>(target);
-  UnregisterRecords<ReflectedEnum>(target);
-  UnregisterRecords<ReflectedVariant>(target);
-  UnregisterRecords<ReflectedFunctor>(target);
-  UnregisterRecords<ReflectedGlobalFunction>(target);
-  UnregisterRecords<ReflectedGlobalVariable>(target);
-  UnregisterRecords<ReflectedTypedef>(target);
-}
-
 XTarget::~XTarget() {
   if (IsProcessEnding(this)) return;
   UnregisterTarget(this);
@@ -143,19 +132,24 @@ XTarget::~XTarget() {
 
 // --- What the header declares for each kind of record
 
-#define VESK_RECORD_KIND(R)                                                          \
+#define VESK_RECORD_KINDS(DO) \
+  DO(ReflectedClass)          \
+  DO(ReflectedInterface)      \
+  DO(ReflectedEnum)           \
+  DO(ReflectedVariant)        \
+  DO(ReflectedFunctor)        \
+  DO(ReflectedGlobalFunction) \
+  DO(ReflectedGlobalVariable) \
+  DO(ReflectedTypedef)
+
+#define VESK_DEFINE(R)                                                               \
   NSE Register##R(R const* record, XTarget* t) { return RegisterRecord(record, t); } \
   template R const* Find(std::string const&);                                        \
   template xvector<R const*> All();                                                  \
   template XTarget* TargetOf(R const&);
+VESK_RECORD_KINDS(VESK_DEFINE)
 
-VESK_RECORD_KIND(ReflectedClass)
-VESK_RECORD_KIND(ReflectedInterface)
-VESK_RECORD_KIND(ReflectedEnum)
-VESK_RECORD_KIND(ReflectedVariant)
-VESK_RECORD_KIND(ReflectedFunctor)
-VESK_RECORD_KIND(ReflectedGlobalFunction)
-VESK_RECORD_KIND(ReflectedGlobalVariable)
-VESK_RECORD_KIND(ReflectedTypedef)
+#define VESK_UNREGISTER(R) UnregisterRecords<R>(target);
+void UnregisterTarget(XTarget const* target) { VESK_RECORD_KINDS(VESK_UNREGISTER) }
 
 }  // namespace vesk

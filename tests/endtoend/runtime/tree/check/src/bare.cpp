@@ -12,9 +12,11 @@ namespace
 template <typename T>
 vesk::xstring OffersOf(T const& value)
 {
-    const T copy = value;
+    alignas(T) char memory[sizeof(T)];
+    T& copy = *reinterpret_cast<T*>(memory);
     vesk::TypeOps const& ops = vesk::GetTypeOps<T>();
-    return vesk::TextOf([&](vesk::xostream& os) {
+    ops.m_copyConstruct(&copy, 0, &value, 0, 1);
+    const vesk::xstring offers = vesk::TextOf([&](vesk::xostream& os) {
         os << (ops.m_equal(&value, &copy) ? "equal " : "") << (ops.m_less(&copy, &copy) ? "less " : "");
         ops.m_print(os, &value);
         try
@@ -31,6 +33,8 @@ vesk::xstring OffersOf(T const& value)
             os << ' ' << error.what();
         }
     });
+    ops.m_destruct(&copy, 0, 1);
+    return offers;
 }
 
 }
