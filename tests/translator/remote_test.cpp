@@ -17,7 +17,7 @@ TEST_F(RemoteTest, Faults) {
 TEST_F(RemoteTest, RegisteredNames) {
   TranslateHeader("$interface rmi I { };\nnamespace n { $interface ipc J { }; }");
   EXPECT_EQ((std::vector<std::string>{"StubI", "SkeletonI", "n::StubJ", "n::ScionJ"}),
-            host->RegisterMap().entries["app/src/t.cpp"]);
+            builder->RegisterMap().entries["app/src/t.cpp"]);
 }
 
 }  // namespace
