@@ -163,6 +163,20 @@ def test_tour(binary):
         compile_with_clang(workspace, ["orders1", "orders", "app"], "-Wno-deprecated-declarations")
 
 
+def run_tour(binary, compiler):
+    workspace, root = translate(binary, "tour.qrws", tree=TOUR / "tree")
+    with workspace:
+        for project in ("orders1", "orders", "app"):
+            workspace.shell(f"{compiler} -c -I{root} -I{root}/{project} -I{root}/{project}/src {root}/{project}/src/*.cpp")
+        workspace.shell(f"{compiler} -I{root} *.o library.cpp -o tour")
+        equal(workspace.shell("./tour 2>&1"), (TOUR / "expected.txt").read_text())
+
+
+def test_undefined_behaviour(binary):
+    need("g++")
+    run_tour(binary, "g++ -std=c++17 -g1 -fsanitize=address,undefined -Wall -Werror -Wno-deprecated-declarations")
+
+
 def test_libcxx(binary):
     """Another standard library: the tour runs, and each kind of type is registered."""
     need("clang++")
@@ -170,12 +184,7 @@ def test_libcxx(binary):
     if subprocess.run([*compiler.split(), "-xc++", "-include", "set", "/dev/null", "-o", "/dev/null", "-shared"],
                       capture_output=True).returncode != 0:
         raise Skipped("libc++")
-    workspace, root = translate(binary, "tour.qrws", tree=TOUR / "tree")
-    with workspace:
-        for project in ("orders1", "orders", "app"):
-            workspace.shell(f"{compiler} -c -I{root} -I{root}/{project} -I{root}/{project}/src {root}/{project}/src/*.cpp")
-        workspace.shell(f"{compiler} -I{root} *.o library.cpp -o tour")
-        equal(workspace.shell("./tour"), (TOUR / "expected.txt").read_text())
+    run_tour(binary, compiler)
     workspace, root = translate(binary, "all.qrws")
     with workspace:
         for source in ("kinds/src/kinds.cpp", "check/src/bare.cpp"):
@@ -257,5 +266,5 @@ def test_modules(binary):
 
 
 if __name__ == "__main__":
-    run_tests([test_every_kind, test_compilable_text, test_tour, test_libcxx, test_byte_order, test_ipc, test_threads, test_sockets,
-               test_modules])
+    run_tests([test_every_kind, test_compilable_text, test_tour, test_undefined_behaviour, test_libcxx, test_byte_order, test_ipc,
+               test_threads, test_sockets, test_modules])
