@@ -11,6 +11,7 @@
 #include "generators/generate.h"
 #include "platform/console.h"
 #include "platform/folder_lock.h"
+#include "text/file_lookup.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"

@@ -4,9 +4,7 @@
 
 #include <cstdint>
 #include <cstdio>
-#include <deque>
 #include <memory>
-#include <memory_resource>
 #include <string>
 #include <string_view>
 #include <unordered_map>
@@ -23,24 +21,6 @@ class DirectoryTimes;
 }
 
 bool FileExists(const std::string& path);  // a plain file that opens for reading: no directory, pipe, socket, device
-// FileExists for many files of few directories: each directory is listed once.
-class FileLookup {
- public:
-  bool Exists(const std::string& path);
-
- private:
-  struct Directory {
-    std::string path;  // with a slash at the end
-    std::vector<std::string> plainFiles;
-    std::pmr::unordered_set<std::string_view> index;  // of these
-  };
-  const Directory& DirectoryOf(std::string_view path);
-
-  std::pmr::monotonic_buffer_resource m_memory;  // of the indexes
-  std::deque<Directory> m_directories;
-  std::unordered_map<std::string_view, const Directory*> m_byPath;
-  const Directory* m_last = nullptr;  // asked for
-};
 bool DeleteFile(const std::string& path);
 // A program stays executable; a read-only target is replaced like any other.
 bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);

@@ -6,6 +6,7 @@
 
 #include "platform/error.h"
 #include "platform/system.h"
+#include "text/file_lookup.h"
 #include "text/guid.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
