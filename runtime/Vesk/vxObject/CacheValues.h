@@ -12,7 +12,7 @@ constexpr bool TypeHasAdditionalSize() {
 
 template <typename T>
 ssize_t CacheValueAdditionalSize(T const& value) {
-  if (ValuePlace* place = ValuePlace::Asked()) *place = {&value, sizeof(value), std::is_same<T, bool>::value};
+  if (ValuePlace* place = ValuePlace::Asked()) *place = {&value, sizeof(value)};
   if constexpr (TypeHasAdditionalSize<T>()) return static_cast<ssize_t>(value.size() * sizeof(*value.begin()));
   return 0;
 }

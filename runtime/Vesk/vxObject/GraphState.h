@@ -68,7 +68,6 @@ class PerThread {
 struct ValuePlace {
   void const* m_begin = nullptr;
   std::size_t m_size = 0;
-  bool m_isBool = false;
 
   static ValuePlace*& Asked() {
     static thread_local ValuePlace* place = nullptr;
@@ -93,17 +92,11 @@ struct Calculation {
   void Forget(DGNode const* node, DGNode const* input);
   // Whether this is memory of the calculation itself (its variables, its value), of which it cannot depend.
   bool Owns(void const* address);
-  // A bool that nothing has written yet becomes one: the calculation compares it with what comes.
-  void SettleBool();
 
   DGNode const* m_node;
   GraphState& m_state;
   Calculation* m_outer;
   std::unordered_set<DGNode const*> m_inputs;  // filled once there are many
-
- private:
-  ValuePlace const& Place();
-
   ValuePlace m_place;
   bool m_isPlaceKnown = false;
 };

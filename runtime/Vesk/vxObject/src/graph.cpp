@@ -288,7 +288,7 @@ void DGNode::Recalculate(GraphState& state) const {
   bool isChanged;
   {
     Calculation calculation(state, this);
-    if (std::exchange(m_isEmpty, false)) calculation.SettleBool();
+    m_isEmpty = false;
     isChanged = RecalcCache();
     if (state.m_deep) throw DeepRead();  // its reader thought that it could do without
   }
@@ -334,22 +334,12 @@ bool Calculation::Owns(void const* address) {
   const std::uintptr_t at = reinterpret_cast<std::uintptr_t>(address);
   const std::uintptr_t here = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
   if (here < at && at < reinterpret_cast<std::uintptr_t>(this)) return true;
-  return at - reinterpret_cast<std::uintptr_t>(Place().m_begin) < Place().m_size;
-}
-
-void Calculation::SettleBool() {
-  if (!Place().m_isBool) return;
-  unsigned char& byte = *static_cast<unsigned char*>(const_cast<void*>(Place().m_begin));
-  if (byte > 1) byte = 0;
-}
-
-ValuePlace const& Calculation::Place() {
   if (!m_isPlaceKnown) {
     m_isPlaceKnown = true;
     ValuePlace::Scope scope(m_place);
     m_node->ByteSize();
   }
-  return m_place;
+  return at - reinterpret_cast<std::uintptr_t>(m_place.m_begin) < m_place.m_size;
 }
 
 void GraphState::End() {
