@@ -118,6 +118,12 @@ TEST_F(TextChecksTest, AModelThatHidesAnother) {
       "model that has the fields of both\n";
   AssertWarned(models + "$struct S : model Own mixin [ M ] { };", warning);
   AssertWarned(models + "$struct S : model { int32 c; } mixin [ M ] { };", warning);
+  std::string ladder = models + "$mixin L0 : mixin [ M ] { };";
+  for (int step = 0; step < 60; ++step) {
+    const std::string below = std::to_string(step);
+    ladder += "$mixin L" + std::to_string(step + 1) + " : mixin [ L" + below + " L" + below + " ] { };";
+  }
+  AssertWarned(ladder + " $struct S : model Own mixin [ L60 ] { };", warning);
   AssertWarned(models + "$mixin L : mixin [ M ] { }; $struct S : model Own mixin [ L ] { };", warning);
   AssertWarned(models + "$struct S : mixin [ M ] { };", "");
 }

@@ -1,6 +1,7 @@
 #include "translator/class/text_checks.h"
 
 #include <algorithm>
+#include <set>
 
 #include "translator/declared/class_def.h"
 #include "translator/reader/qrex_parser.h"
@@ -9,10 +10,11 @@ namespace qrex {
 
 namespace {
 
-// Appends those of the class's mixins, and of theirs, that bring a model; the outermost comes last.
-void CollectModels(const ClassDef& def, std::vector<const ClassDef*>& models) {
+// Appends those of the class's mixins, and of theirs, that bring a model; the outermost comes last. What several mixins
+// list is walked once: a ladder of them has more ways down than can be gone.
+void CollectModels(const ClassDef& def, std::vector<const ClassDef*>& models, std::set<const ClassDef*>& walked) {
   for (const ClassDef* mixin : def.m_mixins) {
-    CollectModels(*mixin, models);
+    if (walked.insert(mixin).second) CollectModels(*mixin, models, walked);
     if (mixin->IsPureModel() || mixin->m_inheritsModel) models.push_back(mixin);
   }
 }
@@ -20,7 +22,8 @@ void CollectModels(const ClassDef& def, std::vector<const ClassDef*>& models) {
 // All models are `_model_`, so that the outermost hides the others.
 void CheckModels(QrexParser& parser, const ClassDef& def) {
   std::vector<const ClassDef*> models;
-  CollectModels(def, models);
+  std::set<const ClassDef*> walked;
+  CollectModels(def, models, walked);
   if (models.empty()) return;
   if (def.m_inheritsModel) {
     parser.ReportWarning(Warnings::kTwoModels,
