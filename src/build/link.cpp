@@ -151,8 +151,33 @@ void HintAtUnbuiltLibraries(const ProjectBuilder& builder) {
 
 }  // namespace
 
+namespace {
+
+std::string LinkerResponseFile(const ProjectBuilder& builder) {
+  return builder.IntermediateDirectory() + "/linker.rsp";
+}
+std::string ManifestResponseFile(const ProjectBuilder& builder) { return builder.IntermediateDirectory() + "/mt.rsp"; }
+std::string ManifestBatchFile(const ProjectBuilder& builder) { return builder.IntermediateDirectory() + "/mtdep.bat"; }
+
+}  // namespace
+
+// A target without its manifest must not pass for a good one.
+bool MakeTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
+  try {
+    ToolOutputs outputs(builder.settings, {target},
+                        {LinkerResponseFile(builder), ManifestResponseFile(builder), ManifestBatchFile(builder)});
+    if (!LinkTarget(builder, target, inputs)) return false;
+    if (CompilerOf(builder.settings.compiler).embedsManifest && !EmbedManifest(builder)) return false;
+    return outputs.Keep();
+  } catch (const FileException& exception) {
+    TraceWriter() << "Error: " << exception << "\n";
+  }
+  ++builder.errorCount;
+  return false;
+}
+
 bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
-  const std::string responseFile = builder.IntermediateDirectory() + "/linker.rsp";
+  const std::string responseFile = LinkerResponseFile(builder);
   const bool isGcc = IsGccFamily(builder.settings.compiler);
   const std::string text = isGcc ? GccLinkerText(builder, target, inputs) : VisualLinkerText(builder, inputs);
   int returnCode = 0;
@@ -166,7 +191,8 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
     CommandOptions options;
     options.echo = builder.settings.diagnostics;
     options.failOnNonZero = true;
-    linked = RunCommand(LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode, options);
+    linked = RunCommand(builder.settings.tools, LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode,
+                        options);
     if (!linked) TraceWriter() << responseFile << ": " << text << "\n";
   } catch (const FileException&) {
     TraceWriter() << "Error writing " << text << " - linking failed\n";
@@ -174,7 +200,6 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   if (linked) return true;
   HintAtUnbuiltLibraries(builder);
   ++builder.errorCount;
-  if (isGcc || IsAbnormalEnd(returnCode)) DeleteThoughReadOnly(target);  // half a target must not pass for a good one
   return false;
 }
 
@@ -187,7 +212,7 @@ bool RunManifestCommand(const ProjectBuilder& builder, const std::string& comman
   options.echo = builder.settings.diagnostics;
   options.failOnNonZero = true;
   int returnCode;
-  return RunCommand(command, returnCode, options);
+  return RunCommand(builder.settings.tools, command, returnCode, options);
 }
 
 bool UpdateManifest(const ProjectBuilder& builder) {
@@ -201,7 +226,7 @@ bool UpdateManifest(const ProjectBuilder& builder) {
   const std::string text = "/outputresource:\"" + builder.LibraryDirectory() + "/" + name + "\";#" +
                            std::string(resource) + " /manifest \"./" + directory + "/" + name +
                            ".intermediate.manifest\"\n";
-  const CommandFile response(builder.settings.leftovers, directory + "/mt.rsp", text);
+  const CommandFile response(builder.settings.leftovers, ManifestResponseFile(builder), text);
   if (builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
   return RunManifestCommand(builder, "mt.exe @\"" + response.Path() + "\" /nologo");
 }
@@ -210,7 +235,7 @@ bool UpdateManifest(const ProjectBuilder& builder) {
 bool MarkManifestTime(const ProjectBuilder& builder) {
   std::string directory;
   ReplaceChar(builder.IntermediateDirectory(), directory, '/', '\\');
-  const CommandFile batch(builder.settings.leftovers, builder.IntermediateDirectory() + "/mtdep.bat",
+  const CommandFile batch(builder.settings.leftovers, ManifestBatchFile(builder),
                           "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
   return RunManifestCommand(builder, "\"" + directory + "\\mtdep.bat\"");
 }

@@ -90,7 +90,7 @@ bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& respons
   if (options.echo) TraceWriter() << responseFile << " = " << text << "\n";
   try {
     const CommandFile response(builder.settings.leftovers, responseFile, text);
-    if (RunCommand(command + " @\"" + responseFile + "\"", returnCode, options)) return true;
+    if (RunCommand(builder.settings.tools, command + " @\"" + responseFile + "\"", returnCode, options)) return true;
     TraceWriter() << responseFile << ": " << text << "\n";
   } catch (const FileException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
@@ -99,21 +99,26 @@ bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& respons
 }
 
 // Runs a compiler or assembler and lets its output decide. The return code matters only where it says that the tool did
-// not come to its own end and, in the gcc family, that it failed without a message of the known forms. Half an object
-// must not pass for a good one in the next run.
+// not come to its own end and, in the gcc family, that it failed without a message of the known forms.
 bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::string& responseFile,
                 const std::string& text, const std::string& command) {
   const int64_t errorsBefore = builder.errorCount;
   const bool isGcc = IsGccFamily(builder.settings.compiler);
   std::string output;
   int returnCode = 0;
-  const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
-  if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) return true;
+  try {
+    ToolOutputs object(builder.settings, {ObjectPath(builder, file)}, {responseFile});
+    const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
+    if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) {
+      return object.Keep();
+    }
+  } catch (const FileException& exception) {
+    TraceWriter() << "Error: " << exception << "\n";
+  }
   if (builder.errorCount == errorsBefore) {
     if (isGcc && returnCode != 0) TraceWriter() << "Return code : " << returnCode << "\n";
     ++builder.errorCount;
   }
-  if (!ran || isGcc || IsAbnormalEnd(returnCode)) DeleteThoughReadOnly(ObjectPath(builder, file));
   return false;
 }
 
@@ -147,9 +152,14 @@ bool CompileResource(ProjectBuilder& builder, ScannedFile& scanned) {
   options.echo = builder.settings.diagnostics;
   options.failOnNonZero = true;
   int returnCode;
-  const bool succeeded = RunCommand(command.TakeText(), returnCode, options);
-  if (!succeeded) ++builder.errorCount;
-  return succeeded;
+  try {
+    ToolOutputs resource(builder.settings, {ResourceObjectPath(builder, scanned.file)}, {});
+    if (RunCommand(builder.settings.tools, command.TakeText(), returnCode, options)) return resource.Keep();
+  } catch (const FileException& exception) {
+    TraceWriter() << "Error: " << exception << "\n";
+  }
+  ++builder.errorCount;
+  return false;
 }
 
 }  // namespace qrex

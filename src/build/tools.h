@@ -29,6 +29,8 @@ bool CompileFile(ProjectBuilder& builder, ScannedFile& file);
 bool AssembleFile(ProjectBuilder& builder, ScannedFile& file);
 bool CompileResource(ProjectBuilder& builder, ScannedFile& file);
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder);
+bool MakeTarget(ProjectBuilder& builder, const std::string& target,
+                const std::vector<std::string>& inputs);  // the two:
 bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs);
 bool EmbedManifest(ProjectBuilder& builder);
 

@@ -414,12 +414,19 @@ namespace {
 // Tools of two builds in one folder would write over each other's objects and captured output.
 void WaitForOtherBuilds(platform::FolderLock& folder) {
   if (folder.TryToTake()) return;
-  const uint64_t holder = folder.Holder();
+  uint64_t holder = folder.Holder();
+  if (!platform::IsProcessRunning(holder)) holder = 0;  // killed: what it started is about to end
   TraceWriter() << "Waiting for " << (holder == 0 ? "another process" : "process " + std::to_string(holder))
                 << ", which builds in this folder\n";
   platform::FlushStdout();
   folder.Take();
 }
+
+// The keeper shares the lock: the next build must not find it held any more.
+struct KeeperEnd {
+  platform::ToolKeeper& tools;
+  ~KeeperEnd() { tools.Stop(); }
+};
 
 }  // namespace
 
@@ -429,7 +436,12 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (!CheckPathSyntax(settings)) return false;
   platform::FolderLock folder(".");
   const bool builds = settings.mode == RunMode::Build || settings.mode == RunMode::Compile;
-  if (builds && !settings.translateOnly) WaitForOtherBuilds(folder);
+  const KeeperEnd keeperEnd{settings.tools};
+  if (builds && !settings.translateOnly) {
+    WaitForOtherBuilds(folder);
+    if (!settings.outputNotes.DeleteNoted()) return false;
+    settings.tools.Start();
+  }
   const auto run = std::make_shared<WorkspaceRun>(settings);
   if (loaded) *loaded = run;
   return run->LoadAll() && run->Run(timer);

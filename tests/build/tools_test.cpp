@@ -68,18 +68,19 @@ TEST_F(ToolsTest, RunCommandAnswersAsTheOptionsSay) {
   std::string output, errors;
   int code;
   const CommandOptions capture{.output = &output, .errors = &errors};
-  ASSERT_TRUE(RunCommand("cmd /c exit 3", code, {}));
+  ASSERT_TRUE(RunCommand(settings.tools, "cmd /c exit 3", code, {}));
   ASSERT_EQ(3, code);
   ASSERT_EQ("", trace);
   AddTool("both", "printf 'a\\r\\nb'\nprintf oops >&2\n");
-  ASSERT_TRUE(RunCommand("both", code, capture));
+  ASSERT_TRUE(RunCommand(settings.tools, "both", code, capture));
   ASSERT_EQ("a\nb|oops|oops\n", output + "|" + errors + "|" + trace);
   ASSERT_FALSE(FileExists("out1.txt") || FileExists("out2.txt"));
   trace.clear();
-  ASSERT_TRUE(RunCommand("both", code, {.echo = true, .output = &output, .errorsIntoOutput = true}));
+  ASSERT_TRUE(RunCommand(settings.tools, "both", code, {.echo = true, .output = &output, .errorsIntoOutput = true}));
   ASSERT_EQ("a\nboops|both 1>out1.txt 2>&1\n", output + "|" + trace);
   trace.clear();
-  ASSERT_FALSE(RunCommand("both", code, {.output = &output, .errors = &errors, .failOnErrorText = true}));
+  ASSERT_FALSE(
+      RunCommand(settings.tools, "both", code, {.output = &output, .errors = &errors, .failOnErrorText = true}));
   ASSERT_EQ("both 1>out1.txt 2>out2.txt\noops\n", trace);
 }
 
@@ -108,7 +109,7 @@ TEST_F(ToolsTest, CommandsThatFail) {
   for (const auto& [command, options, expected] : cases) {
     int code;
     trace.clear();
-    EXPECT_FALSE(RunCommand(command, code, options)) << command;
+    EXPECT_FALSE(RunCommand(settings.tools, command, code, options)) << command;
     EXPECT_EQ(expected, trace);
   }
 }
@@ -118,7 +119,7 @@ TEST_F(ToolsTest, InterruptedCommandsEndTheRun) {
   std::string output;
   int code;
   ASSERT_EQ("Interrupted while running stopped",
-            MessageOf([&] { RunCommand("cmd /c stopped x", code, {.output = &output}); }));
+            MessageOf([&] { RunCommand(settings.tools, "cmd /c stopped x", code, {.output = &output}); }));
   ASSERT_FALSE(FileExists("out1.txt"));
 }
 
@@ -209,7 +210,7 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
   } cases[] = {
       {kVisual, "x.cpp\n", "0", true, 0, 0, true},
       {kVisual, "x.cpp(3) : warning C4100: w\n", "2", true, 0, 1, true},
-      {kVisual, "x.cpp(3) : error C1: e\nx.cpp(4) : error C2: e\n", "0", false, 2, 0, true},
+      {kVisual, "x.cpp(3) : error C1: e\nx.cpp(4) : error C2: e\n", "0", false, 2, 0, false},
       {kVisual, "", "127", false, 1, 0, false},
       {kVisual, "x.cpp(3) : error C1: e\n", "139", false, 1, 0, false},
       {kGcc, "", "0", true, 0, 0, true},
