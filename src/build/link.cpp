@@ -88,10 +88,7 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
   }
   for (const std::string& input : inputs) text += " \"" + input + "\"";
   if (builder.project.targetType == TargetType::StaticLibrary) return text;
-  std::string libraryDirectory;
-  if (FullPathOf(builder.LibraryDirectory(), libraryDirectory)) {
-    text += " -Xlinker -rpath -Xlinker \"" + libraryDirectory + "\"";  // a comma would end the path behind -Wl
-  }
+  text += " -Xlinker -rpath -Xlinker '$ORIGIN'";  // the targets of a configuration share a folder, wherever it is moved
   for (const std::string& token : LinkerTokens(builder.config.linkerText)) text += " " + token;
   return text;
 }

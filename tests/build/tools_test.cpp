@@ -382,12 +382,9 @@ TEST_F(ToolsTest, GccLinks) {
   WriteProject("hidden", "Static Library", "{ }");
   Project& app = AddApp("Application", "\"a.cpp\" \"r.rc\"", "subproj { \"top\" \"shared\" \"base\" }");
   app.configs.front()->linkerText = " -lm \"-Wl,-z now\"";
-  std::string folder;
-  FullPathOf("lib/x64/Debug", folder);
   const std::string inputs =
       " \"x64/Debug/app/a.o\" \"lib/x64/Debug/libtop.a\" \"lib/x64/Debug/libmiddle.a\" \"tree/x64/Debug/libshared.so\""
-      " \"lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker \"" +
-      folder + "\" -lm \"-Wl,-z now\"\n";
+      " \"lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker '$ORIGIN' -lm \"-Wl,-z now\"\n";
   Builder(CompilerKind::gcc);
   ASSERT_TRUE(LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder)));
   ASSERT_EQ("g++ @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/app\"" + inputs, TakeLog());

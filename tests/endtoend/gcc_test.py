@@ -102,6 +102,17 @@ def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     equal(workspace.shell(PROGRAM), RESULT)
 
 
+@in_workspace({**FILES, "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -fPIC }\n',  # debug data names the folder
+               "tree/app/src/app.qrpj": FILES["tree/app/src/app.qrpj"].replace(" -Wl,-rpath,out/lib/x64/Debug", "")}, "g++")
+def a_built_tree_moves_and_two_checkouts_are_equal(workspace):
+    workspace.shell("mkdir -p one 'another one/b' && cp -r all.qrex tree one && cp -r all.qrex tree 'another one/b'")
+    for folder in ("one", "another one/b"):
+        holds(workspace.shell(f"cd '{folder}' && Qrex all.qrex"), "\nCompleted....")
+    workspace.shell("diff -r one/out/lib 'another one/b/out/lib'")
+    workspace.shell("mv one/out/lib/x64/Debug moved && rm -r one")
+    equal(workspace.shell("moved/app"), RESULT)
+
+
 @in_workspace(FILES, "g++")
 def messages_point_at_the_source(workspace):
     workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
@@ -126,8 +137,7 @@ def link_errors_are_counted_and_leave_no_target(workspace):
     output = workspace.run("all.qrex")
     holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
           "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
-          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker \"",
-          "/out/lib/x64/Debug\" -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
+          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker '$ORIGIN' -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
           "\nCompleted with 0 warnings, 1 errors.")
     assert not workspace.path(PROGRAM).exists()
     workspace.replace("tree/app/src/parts.cpp", "int Other()", "int Parts()")
@@ -262,6 +272,7 @@ def make_takes_a_compiler_launcher(workspace):
 
 run_tests([
     builds_libraries_and_a_program_and_only_what_is_stale,
+    a_built_tree_moves_and_two_checkouts_are_equal,
     messages_point_at_the_source,
     link_errors_are_counted_and_leave_no_target,
     a_program_without_libraries_is_linked,
