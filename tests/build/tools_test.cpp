@@ -278,6 +278,23 @@ TEST_F(ToolsTest, MessagesAreCounted) {
   }
 }
 
+TEST_F(ToolsTest, ManyMessagesInALineTakeLinearTime) {
+  AddApp("Application", "");
+  constexpr int kMessages = 100'000;
+  const struct {
+    CompilerKind compiler;
+    const char* message;
+  } cases[] = {{CompilerKind::vc9, "qrexsource/x64/Debug/x.cpp(1) : error "},
+               {CompilerKind::gcc, "x.cpp:1:1: error: "}};
+  for (const auto& test : cases) {
+    Builder(test.compiler);
+    std::string text;
+    for (int i = 0; i < kMessages; ++i) text += test.message;
+    EXPECT_FALSE(ScanToolOutput(*builder, text));
+    EXPECT_EQ(kMessages, builder->errorCount);
+  }
+}
+
 TEST_F(ToolsTest, MessagesPointAtTheSource) {
   AddApp("Application", "\"x.cpp\" \"unused.cpp\"");
   Write("tree/app/src/x.cpp", "@def both = { int a;\nint b; }\nboth\nint c;\n");
