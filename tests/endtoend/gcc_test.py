@@ -166,6 +166,48 @@ def a_program_without_libraries_is_linked(workspace):
     workspace.shell(PROGRAM, status=7)
 
 
+# A program that needs a prepackaged library, a library that a static subproject names, and an assembled file.
+BEHIND_A_LIBRARY = {
+    **PROGRAM_ALONE,
+    "tree/app/src/app.qrpj": PROGRAM_ALONE["tree/app/src/app.qrpj"].replace(
+        "qrex", 'subproj { "d" "s" }\n+link { "vendor/$(Platform).o" -L"$(Configuration)" }\nqrex').replace(
+        '"x.cpp"', '"x.cpp" "z.asm"'),
+    "tree/app/src/x.cpp": 'extern "C" int D(), S(), V(), W(), Z();\nint main() { return D() + S() + W() + Z(); }\n',
+    "tree/app/src/z.asm": ".intel_syntax noprefix\n.globl Z\nZ: mov eax, 2\nret\n",
+    "tree/d/src/d.qrpj": '$TARGET_TYPE = "Dynamic-Link Library"\n$ROOT_TO_PROJDIR = "d"\nconfig { "Debug|x64" }\n'
+                         "qrex export { }\n",
+    "tree/s/src/s.qrpj": '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "s"\nconfig { "Debug|x64" }\n'
+                         '+link { "vendor/libv.a" }\nqrex { "src" { "s.c" } }\n',
+    "tree/s/src/s.c": "int V(); int S() { return V(); }\n",
+    "tools/ml": '#!/bin/sh\necho >> assembled\nsed \'s/.*"\\(.*\\)" "\\(.*\\)"/gcc -c -x assembler -o \\1z.obj \\2/\' "${5#@}"'
+                " | tr -d '\\r' | sh\n",
+}
+
+
+@in_workspace(BEHIND_A_LIBRARY, "g++")
+def what_switches_name_reaches_the_program(workspace):
+    def compile(function, value, output, switches="-c"):
+        workspace.write("one.c", f"int {function}() {{ return {value}; }}\n")
+        workspace.shell(f"mkdir -p vendor tree/x64/Debug && gcc {switches} -o {output} one.c")
+
+    compile("D", 1, "tree/x64/Debug/libd.so", "-shared -fPIC -Wl,-soname,libd.so")
+    compile("V", 10, "v.o")
+    compile("W", 100, "vendor/x64.o")
+    workspace.shell("ar rcs vendor/libv.a v.o")
+    holds(workspace.run("all.qrex"), "\nCompleted....")
+    workspace.shell(f"cd / && {workspace.path(PROGRAM)}", status=113)
+    lacks(workspace.run("all.qrex"), "Linking...")
+    equal(workspace.path("assembled").read_text(), "\n")
+    compile("V", 20, "v.o")
+    workspace.shell("ar rcs vendor/libv.a v.o")
+    holds(workspace.run("all.qrex"), "Linking...")
+    compile("W", 50, "vendor/x64.o")
+    holds(workspace.run("all.qrex"), "Linking...")
+    compile("D", 2, "tree/x64/Debug/libd.so", "-shared -fPIC -Wl,-soname,libd.so")
+    workspace.run("all.qrex")
+    workspace.shell(PROGRAM, status=74)
+
+
 def failing_tools_are_counted_and_the_next_run_recovers(binary):
     need("g++")
     half_an_object = 'text=$(cat "${2#@}"); object=${text##* -o \\"}; echo half > "${object%%\\"*}"\n'
@@ -276,6 +318,7 @@ run_tests([
     messages_point_at_the_source,
     link_errors_are_counted_and_leave_no_target,
     a_program_without_libraries_is_linked,
+    what_switches_name_reaches_the_program,
     failing_tools_are_counted_and_the_next_run_recovers,
     missing_tools_are_named_and_counted,
     captured_output_that_cannot_be_read_is_an_error,
