@@ -202,7 +202,9 @@ bool ProjectBuilder::LinkIfStale() {
     const auto known = m_objectTimes.find(input);
     return known == m_objectTimes.end() ? LastWriteTime(input) : known->second;
   };
-  const bool isCurrent = targetTime != 0 && std::none_of(inputs.begin(), inputs.end(), [&](const std::string& input) {
+  std::vector<std::string> watched = LibrariesOfSwitches(*this);
+  watched.insert(watched.end(), inputs.begin(), inputs.end());
+  const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), [&](const std::string& input) {
                            return timeOf(input) > targetTime;
                          });
   return isCurrent || MakeTarget(*this, target, inputs);

@@ -117,6 +117,7 @@ void ConfigParser::ParseVariable() {
     RequireNoQuote(value, previous);
     m_settings.*variable.field = value;
   }
+  if (name == "TARGET_DIR") RequireNoQuote(value, previous);
   if (name == "COMPILE_FILE_PATH") m_settings.compileFilePath = NormalisePath(value);
   if (name == "TARGET_DIR" && !value.empty()) SplitTargetDirectory(NormalisePath(value));
 }

@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "build/project_builder.h"
+#include "build/tools.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"
 #include "generators/generate.h"
@@ -239,13 +240,17 @@ void WorkspaceRun::CreateMissingFiles(Project& project) const {
   }
 }
 
-// The built target of a prepackaged project goes to the library directory.
+// The built target of a prepackaged project goes to the library directory: by the name that every compiler looks for
+// and, in the gcc family, by the one that its tools give it.
 void WorkspaceRun::Repackage(const Project& project) const {
   if (!m_settings.repackageExecutableTargets || !project.exported) return;
   if (project.targetType == TargetType::UtilityProject) return;
-  const std::string target = m_settings.platform + "/" + m_settings.config + "/" + project.name + "." +
-                             std::string(TargetTypeExtension(project.targetType));
-  CopyIfNewer(m_settings.leftovers, PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
+  auto copy = [&](const std::string& name) {
+    const std::string target = m_settings.platform + "/" + m_settings.config + "/" + name;
+    CopyIfNewer(m_settings.leftovers, PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
+  };
+  copy(project.name + "." + std::string(TargetTypeExtension(project.targetType)));
+  if (IsGccFamily(m_settings.compiler)) copy(GccTargetName(project));
 }
 
 namespace {

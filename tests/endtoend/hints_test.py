@@ -124,6 +124,13 @@ def a_library_that_this_program_does_not_build(binary):
           ["tree/core/src/core.qrpj does not say qrex: this program does not build core, which app links against"])
 
 
+def an_assembler_that_is_missing(binary):
+    changes = {"tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", "qrex", '"app.cpp" "a.asm" "b.asm"'),
+               "tree/app/src/a.asm": "", "tree/app/src/b.asm": "", "tree/all.qrws": '"all" { "app" }\n'}
+    equal(hints_of(binary, changes, "translateOnly=false", 'PATH("x64") = { "none" }'),
+          ["an .asm is given to ml /coff; this compiler has no assembler of its own for it"])
+
+
 run_tests([no_message_no_hint, a_workspace_or_project_that_is_not_found, a_source_that_is_missing,
            an_import_that_is_not_found, an_invalid_word, a_configuration_that_a_project_lacks, a_line_of_the_command_line,
-           a_library_that_this_program_does_not_build])
+           a_library_that_this_program_does_not_build, an_assembler_that_is_missing])
