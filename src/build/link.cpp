@@ -92,7 +92,10 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
   if (FullPathOf(builder.LibraryDirectory(), libraryDirectory)) {
     text += " -Xlinker -rpath -Xlinker \"" + libraryDirectory + "\"";  // a comma would end the path behind -Wl
   }
-  for (const std::string& token : LinkerTokens(builder.config.linkerText)) text += " " + token;
+  for (std::string token : LinkerTokens(builder.config.linkerText)) {
+    ReplaceAllInPlace(token, "$$", "$");  // as make reads it, for which the switches are written as well
+    text += " " + token;
+  }
   return text;
 }
 
