@@ -123,7 +123,9 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
   for (const std::string& library : LibrariesOfSubprojects(builder)) text += " \"" + library + "\"";
   text += " -Xlinker -rpath -Xlinker '$ORIGIN'";  // the targets of a configuration share a folder, wherever it is moved
   for (const std::string& token : LinkerTokens(builder.config.linkerText)) {
-    text += " " + ForConfiguration(token, builder.config);
+    std::string word = ForConfiguration(token, builder.config);
+    ReplaceAllInPlace(word, "$$", "$");  // as make reads it, for which the switches are written as well
+    text += " " + word;
   }
   return text;
 }

@@ -64,6 +64,7 @@ void ConfigParser::ParseStatement() {
       for (size_t i = 0; i < std::size(kModes); ++i) {
         if (word != kModes[i].word) continue;
         m_settings.mode = static_cast<RunMode>(i);
+        if (!IsAddedText(m_settings.sourceFiles, token.text.begin)) m_settings.fileMode = m_settings.mode;
         return;
       }
     } else if (const auto compiler = FindCompiler(word)) {

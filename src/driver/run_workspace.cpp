@@ -7,6 +7,7 @@
 
 #include "build/project_builder.h"
 #include "build/tools.h"
+#include "driver/run_hints.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"
 #include "generators/generate.h"
@@ -198,7 +199,9 @@ void WorkspaceRun::GenerateProject(Project& project) {
   if (!project.exported) CreateMissingFiles(project);
   m_generator.WriteProject(project, Form::Plain);
   if (!project.exported) WriteExportedProject(project);
-  if (project.usesQrex) m_generator.WriteProject(project, Form::Translated);
+  if (!project.usesQrex) return;
+  m_generator.WriteProject(project, Form::Translated);
+  TellCopiedSources(project);
 }
 
 void WorkspaceRun::Prepare(const Project& project) {
@@ -300,6 +303,7 @@ bool WorkspaceRun::BuildProject(Project& project) {
       builder.Clean(dependencyFile);
     } else {
       succeeded = builder.Build(dependencyFile, nullptr);
+      TellCopiedSources(project);
     }
     m_errors += builder.errorCount;
     m_warnings += builder.warningCount;
@@ -316,6 +320,7 @@ void WorkspaceRun::GenerateWorkspace() {
   }
   m_generator.WriteWorkspace(m_workspace, Form::Plain);
   if (AnyProjectUsesQrex(m_workspace)) m_generator.WriteWorkspace(m_workspace, Form::Translated);
+  HintAtCallOfMake(m_workspace);
 }
 
 // --- One file

@@ -48,6 +48,7 @@ struct ConfigSettings {
   bool modernCpp = false;
   bool compilableText = false;
   RunMode mode = RunMode::Build;
+  RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   // Whoever may read the settings may write files and run tools.
   mutable LeftoverSweep leftovers;
