@@ -106,13 +106,6 @@ bool ListsInterface(ReflectedClass const& record, ConstStringZ name) {
   return std::any_of(record.m_interfaces, end, [name](ConstStringZ other) { return std::strcmp(name, other) == 0; });
 }
 
-void ReadObjectMark(InputArchive& ar) {
-  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
-  octet_t const* mark = ar.Take(sizeof(ObjectMark));
-  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
-  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
-}
-
 // --- The heap
 
 ObjectHeap& ObjectHeap::Get() { return Shared<ObjectHeap>(); }
