@@ -175,4 +175,4 @@ def make_files_whose_call_builds_nothing(binary):
 run_tests([no_message_no_hint, a_workspace_or_project_that_is_not_found, a_source_that_is_missing,
            an_import_that_is_not_found, an_import_that_cannot_be_used, sources_that_are_only_copied, an_invalid_word,
            a_configuration_that_a_project_lacks, a_line_of_the_command_line, a_library_that_this_program_does_not_build,
-           make_files_whose_call_builds_nothing])
+           an_assembler_that_is_missing, make_files_whose_call_builds_nothing])

@@ -33,6 +33,9 @@ class FlagScope {
 
 void WritePersistable(Archive& ar, WrittenObject const& object);
 
+// The name of an object's class. ArchiveError for one that nobody registered: it could not be read.
+void WriteClassOf(Archive& ar, ReflectedClass const& record);
+
 // The contents of the objects that were mentioned, unless someone further out is about to write them.
 void WriteContents(Archive& ar);
 
@@ -47,7 +50,7 @@ void WriteObjectMention(Archive& ar, ptr<I> const& object) {
     if (!ClassOf(persistable)) throw ArchiveError("object is not persistable");
   }
   if (!WriteMention(ar, {object.Object(), persistable.Any(), WritePersistable}, typeid(void))) return;
-  ar << xstring(ClassOf(persistable)->m_name);
+  WriteClassOf(ar, *ClassOf(persistable));
   WriteContents(ar);
 }
 
@@ -90,7 +93,13 @@ ssize_t ReadReference(InputArchive& ar, Make make) {
   const ssize_t position = static_cast<ssize_t>(number) - 1;
   if (mention == EMention::Null || mention == EMention::Known) return position;
   auto read = [&] {
-    objects.m_list.push_back(make());
+    objects.m_list.emplace_back();  // so that no object is without its place
+    try {
+      objects.m_list.back() = make();
+    } catch (...) {
+      objects.m_list.pop_back();
+      throw;
+    }
     if (mention == EMention::NewWithContent) ReadContent(ar, position);
   };
   if (objects.m_isReading) {
@@ -171,30 +180,38 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
 // --- Whole objects
 
 // Stands ahead of a whole object; the last byte is the version of the form. No reference begins so, hence what was
-// written without it can be read as well.
-constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 1};
+// written without it can be read as well. From the second version on the releases of the projects follow (Releases.h).
+constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 2};
 
-void ReadObjectMark(InputArchive& ar);
+void ReadObjectHead(InputArchive& ar);
+xvector<octet_t> WithObjectHead(Archive const& objects);
 
 // An object with all that it refers to: classes and contents.
 template <typename I>
 xvector<octet_t> WriteObject(ptr<I> const& object) {
+  WrittenModels models;
   Archive ar;
-  ar.Write(ObjectMark, sizeof(ObjectMark));
+  ar.m_models = &models;
   ar << pref<I>(object);
-  return ar.m_bytes;
+  return WithObjectHead(ar);
 }
 
-// What WriteObject wrote. The objects belong to the caller; the archive is refused (ArchiveError) where the first is
-// no I. `allow` is asked before an object of a class is made.
+// What WriteObject wrote, and nothing behind it. The objects belong to the caller; the archive is refused
+// (ArchiveError) where the first is no I. `allow` is asked before an object of a class is made.
 template <typename I>
 ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits(),
                   std::function<bool(ReflectedClass const&)> allow = nullptr) {
   InputArchive ar(std::move(bytes), limits);
-  ReadObjectMark(ar);
+  ReadObjectHead(ar);
   ar.m_objects.m_allow = std::move(allow);
   pref<I> reference;
-  ar >> reference;
+  try {
+    ar >> reference;
+    if (ar.Remaining() > 0) throw ArchiveError("bytes behind the object");
+  } catch (...) {
+    ar.m_objects.Destroy();
+    throw;
+  }
   return reference.Get();
 }
 

@@ -114,13 +114,18 @@ NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedCla
   xstring name;
   ar >> name;
   ReflectedClass const* record = Find<ReflectedClass>(name);
-  if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
+  if (!record) throw ArchiveError(NotRegistered("class", name));
+  if (!record->m_create) throw ArchiveError("no class to create: " + name);
   if (!fits(*record) || !ListsInterface(*record, GetReflectedInterface<IPersistable>().m_name)) {
     throw ArchiveError("not the class of the reference: " + name);
   }
   if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
-  const ptr<IPersistable> made = QueryInterface<IPersistable>(record->m_create());
-  if (!made) throw ArchiveError("not persistable: " + name);
+  const ptr<IObject> whole = record->m_create();
+  const ptr<IPersistable> made = QueryInterface<IPersistable>(whole);
+  if (!made) {
+    whole->DestroyObject();
+    throw ArchiveError("not persistable: " + name);
+  }
   NumberedObject object;
   object.m_self = made.Object();
   object.m_persistable = made.Any();
@@ -134,13 +139,6 @@ NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedCla
   };
   object.m_destroy = [](NumberedObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
   return object;
-}
-
-void ReadObjectMark(InputArchive& ar) {
-  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
-  octet_t const* mark = ar.Take(sizeof(ObjectMark));
-  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
-  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
 }
 
 // --- The heap
