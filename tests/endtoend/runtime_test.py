@@ -249,6 +249,17 @@ def test_sockets(binary):
     run_with_thread_sanitizer(binary, "sockets", "100\n")
 
 
+def test_memory(binary):
+    """Each allocation of a scenario fails in turn: nothing is lost, destroyed twice or left wrong."""
+    need("g++")
+    workspace, root = translate(binary, "memory.qrws")
+    with workspace:
+        sources = sorted(workspace.path(f"{root}/memory/src").glob("*.cpp"))
+        workspace.write("all.cpp", "".join(f'#include "{source}"\n' for source in [*sources, "library.cpp"]))
+        workspace.shell(f"g++ -std=c++17 -g1 -fsanitize=address,undefined -I. -I{root} all.cpp -o memory")
+        holds(workspace.shell("./memory"), " runs, 0 failures\n")
+
+
 def test_modules(binary):
     """Two plug-ins and a program that hold copies of one project."""
     need("g++")
@@ -269,4 +280,4 @@ def test_modules(binary):
 
 if __name__ == "__main__":
     run_tests([test_every_kind, test_compilable_text, test_tour, test_undefined_behaviour, test_libcxx, test_byte_order, test_ipc,
-               test_threads, test_sockets, test_modules])
+               test_threads, test_sockets, test_memory, test_modules])
