@@ -2,10 +2,12 @@
 """Translates a source of every kind and variation, builds it with g++ against the runtime, and runs what comes of it;
 the same for the tour. clang++ compiles the same text without a complaint."""
 
+import os
 import re
 import shutil
 import subprocess
 import sys
+from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
@@ -240,11 +242,33 @@ def test_threads(binary):
                                "json_writer", "value_types"))
 
 
+def has_asio():
+    command = ["g++", "-E", "-x", "c++", "-include", "boost/asio.hpp", "/dev/null"]
+    return subprocess.run(command, capture_output=True).returncode == 0
+
+
+def test_headers(binary):
+    """Each public header of the library can be the first and only one."""
+    need("g++")
+    workspace, root = translate(binary, "order.qrws")
+    with workspace:
+        headers = sorted(path.name for path in workspace.path(f"{root}/Vesk/vxObject").glob("*.h"))
+        assert len(headers) > 30, headers
+        if not has_asio():
+            headers.remove("SocketChannel.h")
+
+        def errors_of(header):
+            done = subprocess.run(["g++", "-std=c++17", "-fsyntax-only", "-w", f"-I{root}", "-xc++", "-"], cwd=workspace.folder,
+                                  input=f'#include "Vesk/vxObject/{header}"\n', capture_output=True, text=True)
+            return "" if done.returncode == 0 else f"{header}: {done.stderr[:500]}\n"
+        with ThreadPoolExecutor(os.cpu_count()) as pool:
+            equal("".join(pool.map(errors_of, headers)), "")
+
+
 def test_sockets(binary):
     """A server in one thread, stopped by another, and its clients in threads of their own."""
     need("g++")
-    asio = subprocess.run(["g++", "-E", "-x", "c++", "-include", "boost/asio.hpp", "/dev/null"], capture_output=True)
-    if asio.returncode != 0:
+    if not has_asio():
         raise Skipped("boost/asio.hpp")
     run_with_thread_sanitizer(binary, "sockets", "100\n")
 
@@ -280,4 +304,4 @@ def test_modules(binary):
 
 if __name__ == "__main__":
     run_tests([test_every_kind, test_compilable_text, test_tour, test_undefined_behaviour, test_libcxx, test_byte_order, test_ipc,
-               test_threads, test_sockets, test_memory, test_modules])
+               test_headers, test_threads, test_sockets, test_memory, test_modules])
