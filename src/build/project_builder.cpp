@@ -10,6 +10,7 @@
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
+#include "text/trace.h"
 #include "translator/file/translate_file.h"
 
 namespace qrex {

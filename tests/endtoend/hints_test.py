@@ -134,7 +134,7 @@ def a_configuration_that_is_none(binary):
 
 
 def what_macros_hold(binary):
-    lists = ('@for (x in (names)) { }', '@def names = {a}\n\n@for (x in (names)) { }', '@let int64 x = "s"',
+    lists = ('@for (x in names) { }', '@def names = {a}\n\n@for (x in names) { }', '@let int64 x = "s"',
              '@let int64 x = 1\n@let x = "s"')
     file = "tree/tool/src/tool.cpp"
     expected = ("there is no macro names; a list is [a, b] or a macro that holds one",

@@ -311,7 +311,7 @@ TEST_F(AccessorsTest, NestingIsBounded) {
     const std::string below = "M" + ToString(i - 1);
     ladder += "$model M" + ToString(i) + " { " + below + " x; " + below + " y; };\n";
   }
-  AssertErrors({{ladder, 12, "Field x : $model M12 has more than 10000 fields, with those of the models in it"}});
+  AssertErrors({{ladder, 12, "Field y : $model M12 has more than 10000 fields, with those of the models in it"}});
 }
 
 }  // namespace
