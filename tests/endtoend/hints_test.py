@@ -134,8 +134,8 @@ def a_configuration_that_is_none(binary):
 
 
 def what_macros_hold(binary):
-    lists = ('@for (x in names) { }', '@def names = {a}\n\n@for (x in names) { }', '@let int64 x = "s"',
-             '@let int64 x = 1\n@let x = "s"')
+    lists = ('@for (x in names) { }', '@def names = {a}\n\n@for (x in names) { }', '@let int x = "s"',
+             '@let int x = 1\n@let x = "s"')
     file = "tree/tool/src/tool.cpp"
     expected = ("there is no macro names; a list is [a, b] or a macro that holds one",
                 f"the list is names, which stands at {file}(1)", f"in the @let at {file}(1)", f"in the @let at {file}(2)")
