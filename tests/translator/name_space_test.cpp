@@ -115,7 +115,7 @@ TEST_F(LookUp, NamespaceInPlainText) {
         "  # define OPEN(a, b) \\\n  namespace a##b {\n#define CLOSE }\n", "namespace a::b = c;\n"}) {
     EXPECT_EQ(text, Translate("t.cpp", text).substr(0, text.size())) << text;
     MakeWorld(TargetType::Application);
-    EXPECT_EQ("", Fault(text + "$struct S { }; $type+ ::S;")) << text;
+    EXPECT_EQ("", Fault("\n" + text + "$struct S { }; $type+ ::S;")) << text;
     MakeWorld(TargetType::Application);
   }
 }

@@ -140,7 +140,8 @@ TEST_F(TextChecksTest, AModelThatHidesAnother) {
 }
 
 TEST_F(TextChecksTest, AReleaseBehindThatOfAModel) {
-  const std::string model = "namespace n { $model M { int32 a; int32 b; $schema { 1: +a 4: +b } }; }\n";
+  const std::string model =
+      "@import \"Vesk/vxObject/IObject.h\"\nnamespace n { $model M { int32 a; int32 b; $schema { 1: +a 4: +b } }; }\n";
   const auto warning = [&](const std::string& definition) {
     MakeWorld(TargetType::Application);
     AddFile("m.h", model);
