@@ -10,6 +10,7 @@
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
+#include "text/trace.h"
 #include "translator/file/translate_file.h"
 
 namespace qrex {
@@ -35,6 +36,15 @@ ScannedFile& ProjectBuilder::GetScannedFile(ProjectFile& file) {
   std::unique_ptr<ScannedFile>& slot = scannedByPath[file.path];
   if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
   return *slot;
+}
+
+std::vector<const ScannedFile*> ProjectBuilder::FilesOfProject() const {
+  std::vector<const ScannedFile*> files;
+  for (const auto& [path, file] : scannedByPath) {
+    if (file->file.project == &project) files.push_back(file.get());
+  }
+  std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
+  return files;
 }
 
 bool ProjectBuilder::RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) {
@@ -185,11 +195,25 @@ bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
   return compiled;
 }
 
+namespace {
+
+std::string HowToRegister(const ScannedFile& header) {
+  const ProjectFile& file = header.file;
+  const std::string import = "@import \"" + file.name + "\"";
+  if (file.pairedSource) return header.file.project->SourcePath(*file.pairedSource) + " lacks " + import;
+  std::string source;
+  ReplaceExtension(header.SourcePath(), "cpp", source);
+  return "write " + source + " with the line " + import + ", and list it in " + file.project->filePath;
+}
+
+}  // namespace
+
 void ProjectBuilder::ReportUnregistered() const {
   for (const ScannedFile* file : scanned) {
     if (!file->hasDeclarations || file->registered) continue;
     TraceWriter() << file->SourcePath() << "(1) : error : No cpp directly imports " << file->file.name
-                  << " - declarations not registered\n";
+                  << " - declarations not registered\n"
+                  << Hint(HowToRegister(*file));
   }
 }
 

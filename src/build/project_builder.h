@@ -37,6 +37,7 @@ class ProjectBuilder : public TranslationHost {
   SymbolIndex& Symbols() override { return m_symbols; }
   size_t NextFileIndex() override { return m_nextFileIndex++; }
   size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
+  std::vector<const ScannedFile*> FilesOfProject() const override;
   void CountWarning() override { ++warningCount; }
   bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const override;
 

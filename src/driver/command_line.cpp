@@ -1,11 +1,15 @@
 #include "driver/command_line.h"
 
+#include <algorithm>
+#include <iterator>
+
 #include "driver/config_parser.h"
 #include "driver/help.h"
 #include "driver/init.h"
 #include "driver/run_workspace.h"
 #include "lex/literals.h"
 #include "platform/system.h"
+#include "text/files.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
 #include "text/trace.h"
@@ -35,6 +39,34 @@ bool ReadAssignment(const std::string& argument, std::string& name, std::string&
   } catch (const LexScannerException&) {
     return false;  // no assignment: the argument is the configuration
   }
+}
+
+// Whether the words have the same letters but for one, or in another order.
+bool IsAlmost(std::string_view word, std::string_view other) {
+  std::string a(word), b(other);
+  std::sort(a.begin(), a.end());
+  std::sort(b.begin(), b.end());
+  std::string apart;
+  std::set_symmetric_difference(a.begin(), a.end(), b.begin(), b.end(), std::back_inserter(apart));
+  return apart.size() <= 2;
+}
+
+// For what was taken for the path of a configuration, and is none.
+std::string NoConfigurationHint(const std::string& argument) {
+  constexpr std::string_view kOptions[] = {"--help", "--init", "--version"};
+  if (argument.starts_with("-")) {
+    std::string all;
+    for (std::string_view option : kOptions) {
+      if (IsAlmost(argument, option)) return "did you mean " + std::string(option) + "?";
+      all.append(" ").append(option);
+    }
+    return "the options are" + all;
+  }
+  const size_t assign = argument.find('=');
+  if (assign == 0 || assign == std::string::npos) return {};
+  const std::string name = argument.substr(0, assign), value = argument.substr(assign + 1);
+  return "a variable has its value in quotes: '" + name + "=\"" + value +
+         "\"'; a line of the configuration stands behind the file";
 }
 
 }  // namespace
@@ -97,7 +129,10 @@ int CommandLine::RunConfiguration() {
     WriteArgument(i, m_arguments[i]);
     extraConfigText += m_arguments[i] + "\n";
   }
-  if (!LoadConfiguration(m_settings, m_configPath, extraConfigText)) return 1;
+  if (!LoadConfiguration(m_settings, m_configPath, extraConfigText)) {
+    if (!FileExists(m_configPath)) TraceWriter() << Hint(NoConfigurationHint(m_arguments[configIndex]));
+    return 1;
+  }
   const std::string problem = ValidateSettings(m_settings);
   if (!problem.empty()) {
     WriteToConsole(problem + "Error in config file " + m_configPath + "\n");

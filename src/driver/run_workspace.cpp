@@ -37,6 +37,7 @@ class WorkspaceRun {
  private:
   bool LoadWorkspaceFile(const std::string& entry);
   bool RunProjects(ScopeTimer& timer);
+  bool IsLeftAlone(const Project& project) const;
   void GenerateProject(Project& project);
   bool ProcessProject(Project& project);
   void ReportLeftOut(size_t firstIndex) const;
@@ -151,11 +152,14 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
       names << project->name;
     }
     WriteIfChanged(m_settings.leftovers, names, m_workspace.name + ".projects");
-    for (const auto& project : m_workspace.projects) GenerateProject(*project);
+    for (const auto& project : m_workspace.projects) {
+      if (!IsLeftAlone(*project)) GenerateProject(*project);
+    }
     GenerateWorkspace();
   } else {
     for (size_t i = 0; i < m_workspace.projects.size(); ++i) {
-      if (ProcessProject(*m_workspace.projects[i])) continue;
+      Project& project = *m_workspace.projects[i];
+      if (IsLeftAlone(project) || ProcessProject(project)) continue;
       ReportLeftOut(i + 1);
       return false;
     }
@@ -174,6 +178,13 @@ void WorkspaceRun::ReportLeftOut(size_t firstIndex) const {
   std::string names;
   for (size_t i = firstIndex; i < m_workspace.projects.size(); ++i) names += " " + m_workspace.projects[i]->name;
   if (!names.empty()) TraceWriter() << Hint("the run ends here and leaves out:" + names);
+}
+
+// What is known of it is no more than its name: no file that an earlier run wrote of it is touched.
+bool WorkspaceRun::IsLeftAlone(const Project& project) const {
+  if (!project.hasFaultyFile) return false;
+  TraceWriter() << Hint("nothing is done for the project of " + project.filePath + ", whose error is told above");
+  return true;
 }
 
 // Builds or cleans.

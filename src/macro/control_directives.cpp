@@ -158,9 +158,21 @@ void ExpansionContext::For() {
   try {
     RunLoop(loop);
   } catch (LexScannerException& exception) {
+    if (exception.position == loop.list.begin && exception.hint.empty()) exception.hint = ListHint(loop);
     ForgetPosition(exception, loop.elements);
     throw;
   }
+}
+
+// For an error in a list: where the macro stands that holds it.
+std::string ExpansionContext::ListHint(const Loop& loop) const {
+  LexScanner scanner(loop.list, m_scanner.dialect);
+  const LexToken name = NextToken(scanner);
+  if (name.kind != kIdentifier || !m_handler) return {};
+  const LSVariable* variable = m_frame.Find(name.text.View(), name.text.begin);
+  if (!variable) return "there is no macro " + name.text.Text() + "; a list is [a, b] or a macro that holds one";
+  const std::string place = m_handler->PlaceOf(variable->name.begin);
+  return place.empty() ? "" : "the list is " + name.text.Text() + ", which stands at " + place;
 }
 
 void ExpansionContext::RunLoop(const Loop& loop) {

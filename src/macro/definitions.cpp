@@ -54,6 +54,10 @@ void ExpansionContext::Let() {
       value = EvaluateAsText(m_frame, text, type, m_anchor);
     } catch (LexScannerException& exception) {
       if (assigned) exception.message += "\n    when parsing expression '" + text.Text() + "' for @let directive";
+      if (!exception.position && m_handler && exception.hint.empty()) {
+        const std::string place = m_handler->PlaceOf(token.text.begin);
+        if (!place.empty()) exception.hint = "in the @let at " + place;
+      }
       throw;
     }
   }

@@ -18,6 +18,7 @@ constexpr size_t kLargeText = 1u << 20;
 
 bool ImportHandler::ImportPath(const std::string&, const char*) { return false; }
 std::string ImportHandler::ImportHint(const std::string&) const { return {}; }
+std::string ImportHandler::PlaceOf(const char*) const { return {}; }
 
 std::string WithToken(std::string_view message, const LexToken& token) { return std::string(message) + Printed(token); }
 

@@ -15,6 +15,7 @@ class ImportHandler {
   virtual bool Import(LSFrame& frame, const std::string& path, const char* position) = 0;  // false: not found
   // What to tell on a terminal when a file was not found: where it was looked for.
   virtual std::string ImportHint(const std::string& path) const;
+  virtual std::string PlaceOf(const char* position) const;  // "file(line)" of a place in a source, or nothing
   virtual ~ImportHandler() = default;
 };
 

@@ -146,6 +146,7 @@ class ExpansionContext {
   struct Loop;
   Loop ReadLoopHead();
   void RunLoop(const Loop& loop);
+  std::string ListHint(const Loop& loop) const;
   void BindElement(const Loop& loop, const TextRange& element, LSFrame& frame);
 
   ImportHandler* const m_handler;

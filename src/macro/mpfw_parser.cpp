@@ -23,11 +23,33 @@ bool MpfwParser::Import(LSFrame&, const std::string& path, const char* position)
   if (!ResolveImport(expanded, found)) {
     throw LexScannerException("Couldn't open file " + expanded, position).WithHint(ImportHint(expanded));
   }
-  if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", position);
+  if (m_importDepth == 0) m_isTooDeep = false;
+  if (m_importDepth >= kMaxImportDepth) {
+    m_isTooDeep = true;
+    throw LexScannerException("Imports nested too deeply" + CycleText(found), position);
+  }
   ++m_importDepth;
+  m_imports.push_back(found);
   const bool loaded = LoadSourceFile(found) != nullptr;
+  m_imports.pop_back();
   --m_importDepth;
+  if (loaded) m_isTooDeep = false;
   return loaded;
+}
+
+// " : a imports b imports a", of the files under expansion; nothing when `path` is none of them.
+std::string MpfwParser::CycleText(const std::string& path) const {
+  const auto last = std::find(m_imports.rbegin(), m_imports.rend(), path);
+  if (last == m_imports.rend()) return {};
+  std::string text = " : ";
+  for (auto open = last.base() - 1; open != m_imports.end(); ++open) text += *open + " imports ";
+  return text + path;
+}
+
+std::string MpfwParser::PlaceOf(const char* position) const {
+  std::string path;
+  int64_t line;
+  return FindSourceLine(context.sourceFiles, position, path, line) ? path + "(" + std::to_string(line) + ")" : "";
 }
 
 std::unique_ptr<MpfwSourceFile> MpfwParser::CreateSourceFile() { return std::make_unique<MpfwSourceFile>(); }
@@ -53,8 +75,12 @@ bool MpfwParser::ExpandSourceFile(MpfwSourceFile& file) {
         ExpandToStringWithMap(this, context.rootFrame, TextRange(std::string_view(file.text)), 0, 0, file.map);
     return true;
   } catch (const LexScannerException& exception) {
-    TraceWriter trace;
-    ReportParseError(context.sourceFiles, trace, exception);
+    // One message for all files that led too deep.
+    if (!m_isTooDeep || !m_isTooDeepTold) {
+      TraceWriter trace;
+      ReportParseError(context.sourceFiles, trace, exception);
+    }
+    m_isTooDeepTold = m_isTooDeep;
     return false;
   }
 }

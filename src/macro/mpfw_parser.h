@@ -40,6 +40,7 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
 
   bool ImportPath(const std::string& path, const char* position) override;
   bool Import(LSFrame& frame, const std::string& path, const char* position) override;
+  std::string PlaceOf(const char* position) const override;
   virtual std::unique_ptr<MpfwSourceFile> CreateSourceFile();
   virtual bool ResolveImport(const std::string& path, std::string& found) = 0;
   virtual void OnImportedFile(MpfwSourceFile& file) = 0;
@@ -71,9 +72,12 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
 
  private:
   MpfwSourceFile* FindLoaded(const std::string& path) const;  // or null
+  std::string CycleText(const std::string& path) const;
 
   static constexpr int kMaxImportDepth = 200;  // a file may import itself
   int m_importDepth = 0;
+  std::vector<std::string> m_imports;  // under expansion, outermost first
+  bool m_isTooDeep = false, m_isTooDeepTold = false;
   const char* m_importBegin = nullptr;  // the `@` of the import statement at hand
 };
 

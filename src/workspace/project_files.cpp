@@ -256,10 +256,13 @@ void ProjectParser::ParseFileOption(const Files& files) {
   if (!current.Is("cpp")) throw LexScannerException("Expected 'cpp' when read " + Printed(current), current);
   Advance();
   const Scope scope = ReadScope();
-  if (scope.isForOtherCompilers) return SkipBlock();
+  ReadBlockOf(scope, [&] { ReadSwitchesOf(files, scope.configs, add); });
+}
+
+void ProjectParser::ReadSwitchesOf(const Files& files, const Configs& configs, bool add) {
   if (KeepsRawText()) {
     const std::string block = ReadRawBlock();
-    for (ProjectConfig* config : scope.configs) {
+    for (ProjectConfig* config : configs) {
       for (ProjectFile* file : files) {
         FileConfigRecord& record = file->RecordOf(*config);
         std::string& text = add ? record.addText : record.removeText;
@@ -269,7 +272,7 @@ void ProjectParser::ParseFileOption(const Files& files) {
     return;
   }
   const SwitchChanges changes = ReadCompilerSwitches(*this, !add);
-  for (ProjectConfig* config : scope.configs) {
+  for (ProjectConfig* config : configs) {
     for (ProjectFile* file : files) {
       FileConfigRecord& record = file->RecordOf(*config);
       if (add) {

@@ -47,6 +47,17 @@ Project::Project(Workspace& workspace)
   rootFolder.project = this;
 }
 
+void Project::Empty() {
+  usesQrex = exported = libraryIsStatic = false;
+  targetType = TargetType::Application;
+  subprojects.clear();
+  toolFiles.clear();
+  rootFolder.subfolders.clear();
+  rootFolder.files.clear();
+  filesByPath.clear();
+  configs.clear();
+}
+
 bool Project::AddSubproject(const std::string& path) {
   for (const std::string& known : subprojects) {
     if (!EqualIgnoringCase(known, path)) continue;
@@ -78,7 +89,9 @@ std::string Project::ListingHint(const ProjectFile& file) const {
   std::string path;
   int64_t line;
   if (!FindExpandedLine(settings->sourceFiles, file.listedAt, path, line)) return {};
-  return file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+  const std::string listed = file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+  if (filePath.starts_with(PathJoin(rootDir, rootToProjDir) + "/")) return listed;
+  return listed + ", and " + filePath + " does not stand below its $ROOT_TO_PROJDIR, \"" + rootToProjDir + "\"";
 }
 
 namespace {

@@ -89,6 +89,7 @@ struct ProjectFolder {
 struct Project {
   explicit Project(Workspace& workspace);
 
+  void Empty();                                 // what the file said, but for name and place
   void CollectFiles();                          // fills folders, files, filesByName and the header/source pairs, once
   bool AddSubproject(const std::string& path);  // false, with a warning line, when it was there already
   const std::string& MangledProjDir();          // rootToProjDir with `/` as `_`
@@ -102,6 +103,7 @@ struct Project {
   bool libraryIsStatic = false;
   bool usesQrex = false;
   bool exported = false;
+  bool hasFaultyFile = false;  // it was found, but can't be read: nothing is done for the project
   TargetType targetType = TargetType::Application;
   std::string rootDir;
   std::string filePath;

@@ -25,18 +25,21 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   FileFilter directoryFilter;
   directoryFilter.include = false;  // no patterns: every directory passes
   ProjectParser parser(project, directoryFilter);
+  project.hasFaultyFile = true;
   if (!parser.ExpandSourceFile(file)) return false;
   const TextRange expansion{std::string_view(file.expansion)};
   try {
     parser.SetInput(expansion);
     parser.ParseProject();
-    return true;
+    project.hasFaultyFile = false;
   } catch (LexScannerException& exception) {
     MapErrorPosition(file.map, expansion, exception);
+    if (exception.hint.empty() && parser.MayLackBrace()) exception.hint = parser.BlockHint();
     TraceWriter trace;
     ReportParseError(project.settings->sourceFiles, trace, exception);
-    return false;
+    project.Empty();
   }
+  return !project.hasFaultyFile;
 }
 
 bool ProjectParser::ResolveImport(const std::string& path, std::string& found) {
@@ -330,12 +333,22 @@ void ProjectParser::SubstituteInOptions(OptionMap& options, const ProjectConfig&
   for (auto& [name, value] : options) value = ForConfig(std::move(value), config);
 }
 
+// The block of switches at hand, or the last one that holds a brace, which may be that of what follows it.
+std::string ProjectParser::BlockHint() const {
+  std::string path;
+  int64_t line;
+  const char* const block = m_blockWithBrace ? m_blockWithBrace : m_block;
+  if (!FindExpandedLine(context.sourceFiles, block, path, line)) return {};
+  return "is there a } missing? A block of switches begins at " + path + "(" + std::to_string(line) + ")";
+}
+
 // Any tokens in braces. What was apart gets one blank, what was adjacent stays so.
 std::string ProjectParser::ReadRawBlock() {
   RequireBrace();
   std::string text;
   const char* lastEnd = current.text.begin;
   for (; current.kind != kCloseBrace; Advance()) {
+    if (current.kind == kOpenBrace) m_blockWithBrace = m_block;
     if (current.kind == kEndOfText) throw LexScannerException("Unexpected end of file", current);
     std::string token = current.text.Text();
     SubstituteVariables(token);
@@ -347,13 +360,23 @@ std::string ProjectParser::ReadRawBlock() {
   return text;
 }
 
-// What another compiler's switches look like is not known here: they are tokens, as in a raw block.
-void ProjectParser::SkipBlock() {
-  RequireBrace();
-  for (; current.kind != kCloseBrace; Advance()) {
-    if (current.kind == kEndOfText) throw LexScannerException("Unexpected end of file", current);
+// A block of switches, which `read` reads. What another compiler's switches look like is not known here: where they
+// can't be read they are tokens, as in a raw block.
+void ProjectParser::ReadBlockOf(const Scope& scope, const std::function<void()>& read) {
+  const ParserBase before = *this;
+  m_block = current.text.begin;
+  try {
+    read();
+  } catch (LexScannerException& exception) {
+    if (current.kind == kEndOfText || exception.message.starts_with("Expected '}'")) exception.hint = BlockHint();
+    static_cast<ParserBase&>(*this) = before;
+    if (!scope.isForOtherCompilers || current.kind != kOpenBrace) throw;
+    while (current.kind != kCloseBrace) {
+      if (current.kind == kEndOfText) throw;
+      Advance();
+    }
+    Advance();
   }
-  Advance();
 }
 
 void ProjectParser::AppendRawBlock(const Configs& configs, std::string ProjectConfig::*text) {
@@ -380,20 +403,16 @@ bool ProjectParser::ParseOptions(bool add) {
   }
   Advance();
   const Scope scope = ReadScope();
-  if (scope.isForOtherCompilers) {
-    SkipBlock();
-  } else if (isLink) {
-    AppendRawBlock(scope.configs, &ProjectConfig::linkerText);
-  } else if (isCpp && add && KeepsRawText()) {
-    AppendRawBlock(scope.configs, &ProjectConfig::compilerText);
-  } else {
+  ReadBlockOf(scope, [&] {
+    if (isLink) return AppendRawBlock(scope.configs, &ProjectConfig::linkerText);
+    if (isCpp && add && KeepsRawText()) return AppendRawBlock(scope.configs, &ProjectConfig::compilerText);
     const SwitchChanges changes = isCpp ? ReadCompilerSwitches(*this, !add) : ReadResourceSwitches(*this, !add);
     for (ProjectConfig* config : scope.configs) {
       OptionMap& options = isCpp ? config->compilerOptions : config->resourceOptions;
       changes.Apply(options);
       SubstituteInOptions(options, *config);
     }
-  }
+  });
   return true;
 }
 

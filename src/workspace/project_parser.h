@@ -1,6 +1,7 @@
 // Reads a project file: heads, statements, then the file tree.
 #pragma once
 
+#include <functional>
 #include <set>
 #include <string>
 #include <string_view>
@@ -26,6 +27,8 @@ class ProjectParser : public MpfwParser {
 
   void ParseProject();     // on the processed text
   void ParseStatements();  // until a token that begins none
+  bool MayLackBrace() const { return m_blockWithBrace != nullptr; }
+  std::string BlockHint() const;
 
  private:
   using Configs = std::vector<ProjectConfig*>;
@@ -50,7 +53,7 @@ class ProjectParser : public MpfwParser {
   bool IsSelected(const ProjectConfig& config, std::string_view spec) const;
   bool NeedsOtherCompiler(std::string_view spec) const;
   std::string ReadRawBlock();
-  void SkipBlock();
+  void ReadBlockOf(const Scope& scope, const std::function<void()>& read);
   void AppendRawBlock(const Configs& configs, std::string ProjectConfig::*text);
   std::string ForConfig(std::string text, const ProjectConfig& config) const;  // $(PLATFORM), $(CONFIG)
   void SubstituteInOptions(OptionMap& options, const ProjectConfig& config) const;
@@ -84,9 +87,12 @@ class ProjectParser : public MpfwParser {
   void ParseFileOptions(const Files& files);
   void ParseFileOption(const Files& files);
   void ParseExclude(const Files& files);
+  void ReadSwitchesOf(const Files& files, const Configs& configs, bool add);
 
   Project& m_project;
   FileFilter& m_directoryFilter;
+  const char* m_block = nullptr;           // of switches, the last one
+  const char* m_blockWithBrace = nullptr;  // in its raw text
   size_t m_depth = 0;
   const char* m_entry = nullptr;  // of the file tree, which is being read
 };

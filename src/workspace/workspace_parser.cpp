@@ -68,7 +68,7 @@ void WorkspaceParser::ParseNested(const std::string& path) {
   }
   if (m_depth >= kMaxNesting) throw LexScannerException("Workspace files nested too deeply", previous);
   WorkspaceParser nested(m_workspace, fullPath, this);
-  nested.m_depth = m_depth + 50;  // each nested file stands for the stack of many blocks
+  nested.m_depth = m_depth;
   MpfwSourceFile* file = LoadSourceFile(fullPath);
   if (!file) throw LexScannerException("Error in workspace file " + fullPath, previous);
   const TextRange expansion{std::string_view(file->expansion)};

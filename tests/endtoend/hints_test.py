@@ -172,7 +172,56 @@ def make_files_whose_call_builds_nothing(binary):
            "Qrex main.qrex mode=gen for the make files"])
 
 
-run_tests([no_message_no_hint, a_workspace_or_project_that_is_not_found, a_source_that_is_missing,
-           an_import_that_is_not_found, an_import_that_cannot_be_used, sources_that_are_only_copied, an_invalid_word,
-           a_configuration_that_a_project_lacks, a_line_of_the_command_line, a_library_that_this_program_does_not_build,
-           an_assembler_that_is_missing, make_files_whose_call_builds_nothing])
+def a_configuration_that_is_none(binary):
+    quotes = "; a line of the configuration stands behind the file"
+    for argument, hint in (("--hlep", "did you mean --help?"), ("--frob", "the options are --help --init --version"),
+                           ("X=/p", "a variable has its value in quotes: 'X=\"/p\"'" + quotes)):
+        with Workspace(binary, {}) as workspace:
+            output = on_terminal([binary, argument], workspace.folder)
+        equal(output.splitlines()[-2:], [f"Exception: Couldn't open file {argument}", "    hint: " + hint])
+
+
+def what_macros_hold(binary):
+    lists = ('@for (x in names) { }', '@def names = {a}\n\n@for (x in names) { }', '@let int x = "s"',
+             '@let int x = 1\n@let x = "s"')
+    file = "tree/tool/src/tool.cpp"
+    expected = ("there is no macro names; a list is [a, b] or a macro that holds one",
+                f"the list is names, which stands at {file}(1)", f"in the @let at {file}(1)", f"in the @let at {file}(2)")
+    for text, hint in zip(lists, expected):
+        equal(hints_of(binary, {"tree/tool/src/tool.cpp": text + "\n"}), [hint])
+
+
+def what_is_plain_cpp(binary):
+    std = ("nothing of std is reflected: write string8 for std::string, xvector<T> for std::vector<T>, xmap<K,V> for "
+           "std::map<K,V>")
+    for text, hint in (("$[[nodiscard]] int32 f();", "an attribute stands ahead of the $, where it is plain text"),
+                       ("$function+ std::string f();", std)):
+        equal(hints_of(binary, {"tree/tool/src/tool.cpp": text + "\n"}), [hint])
+
+
+def a_project_file_that_misleads(binary):
+    where = " begins at tree/tool/src/tool.qrpj(4)"
+    block = PROJECT.replace('%s\n{', '+cpp %s\n{', 1) % ("Console Application", "tool", "{ -Wall", '"tool.cpp"')
+    none = "nothing is done for the project of tree/tool/src/tool.qrpj, whose error is told above"
+    changes = {"main.qrex": FILES["main.qrex"].replace('"all.qrws"', '"tool"'), "tree/tool/src/tool.qrpj": block}
+    equal(hints_of(binary, changes), ["is there a } missing? A block of switches" + where, none])
+    changes["main.qrex"] = changes["main.qrex"].replace("= gcc", "= vc14")
+    equal(hints_of(binary, changes), ["is there a } missing? A block of switches" + where, none])
+    changes = {"tree/tool/src/tool.qrpj": PROJECT % ("Console Application", "tul", "qrex", '"tool.cpp"')}
+    equal(hints_of(binary, changes),
+          ['tul/src/tool.cpp is listed in tree/tool/src/tool.qrpj(8), and tree/tool/src/tool.qrpj does not stand below '
+           'its $ROOT_TO_PROJDIR, "tul"'])
+
+
+def a_header_that_nobody_registers(binary):
+    changes = {"tree/tool/src/tool.qrpj": PROJECT % ("Console Application", "tool", "qrex", '"tool.cpp" "keeper.h"'),
+               "tree/tool/src/keeper.h": "$enum+ E { x };\n"}
+    equal(hints_of(binary, changes),
+          ['write tree/tool/src/keeper.cpp with the line @import "keeper.h", and list it in tree/tool/src/tool.qrpj'])
+
+
+run_tests([no_message_no_hint, a_configuration_that_is_none, what_macros_hold, what_is_plain_cpp,
+           a_project_file_that_misleads, a_header_that_nobody_registers, a_workspace_or_project_that_is_not_found,
+           a_source_that_is_missing, an_import_that_is_not_found, an_import_that_cannot_be_used, sources_that_are_only_copied,
+           an_invalid_word, a_configuration_that_a_project_lacks, a_line_of_the_command_line,
+           a_library_that_this_program_does_not_build, an_assembler_that_is_missing, make_files_whose_call_builds_nothing])

@@ -215,7 +215,9 @@ BAD_INPUT = [
     # changes to the tree, then what the output holds, in order
     ({'main.qrex': JUNK}, ['main.qrex(1) : ', '    while processing qrex config file : main.qrex\n']),
     ({'main.qrex': CONFIG + '\n\nmoed = build'}, ['\nmain.qrex(15) : Syntax error: moed\n']),
-    ({'main.qrex': CONFIG + '@import "main.qrex"'}, ['main.qrex(13) : Imports nested too deeply\n']),
+    ({'main.qrex': CONFIG + '@import "main.qrex"'}, 
+     ['main.qrex(13) : Imports nested too deeply : main.qrex imports main.qrex\n',
+      '    while processing qrex config file : main.qrex\n']),
     ({'tree/ws/all.qrws': None}, ['\nError: Couldn\'t open workspace file ws/all.qrws\n']),
     ({'tree/ws/all.qrws': None, 'tree/ws/all.qrws/x': ''}, ['\nError: Couldn\'t open workspace file ws/all.qrws\n']),
     ({'tree/ws/all.qrws': JUNK}, ['tree/ws/all.qrws(1) : ', '\nError in workspace file tree/ws/all.qrws\n']),

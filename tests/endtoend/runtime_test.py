@@ -153,7 +153,7 @@ def test_every_kind(binary):
 
 def test_compilable_text(binary):
     """What does not compile without the key: with g++, with clang++, and with clang++ as Visual C++ reads it."""
-    with build(binary, HERE / "runtime" / "tree", "compilable.qrws", "compilableText = true") as workspace:
+    with build(binary, HERE / "runtime" / "tree", "compilable.qrws", "compilableText = true modernCpp = true") as workspace:
         holds(workspace.shell("out/lib/x64/Debug/compilable"), " checks, 0 failures\n")
         compile_with_clang(workspace, ["compilable"], "-Wno-logical-op-parentheses -Wno-deprecated-declarations")
         read_as_visual_cpp(workspace, "compilable")

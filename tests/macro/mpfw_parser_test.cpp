@@ -61,7 +61,12 @@ TEST_F(MpfwParserTest, ReportsErrors) {
   trace.clear();
   Write("self", "@import \"self\"");
   EXPECT_EQ("none", Load("self"));
-  EXPECT_EQ(0u, trace.find("\nself(1) : Imports nested too deeply\n\nself(1) : Can't import"));
+  EXPECT_EQ("\nself(1) : Imports nested too deeply : self imports self\n", trace);
+  trace.clear();
+  Write("e", "@import \"f\"");
+  Write("f", "\n@import \"e\"");
+  EXPECT_EQ("none", Load("e"));
+  EXPECT_EQ("\ne(1) : Imports nested too deeply : f imports e imports f\n", trace);
 }
 
 TEST_F(MpfwParserTest, ReadsStrings) {

@@ -45,6 +45,7 @@ TEST_F(LookUp, CurrentNameSpaceThenRoot) {
 
 // The head of a definition, and the names that lead to what it holds; one brace closes all of them.
 TEST_F(LookUp, HeadsOfNameSpaces) {
+  settings.modernCpp = true;
   static constexpr struct {
     std::string_view head, path;
   } kHeads[] = {
@@ -63,16 +64,58 @@ TEST_F(LookUp, HeadsOfNameSpaces) {
   }
 }
 
+// Text that stands outside leaves as many braces as it found.
+TEST_F(LookUp, TextOutsideOfNameSpaces) {
+  settings.modernCpp = true;
+  const std::string head = "namespace a::inline b { namespace c { ", text = "$enum+ E { x };";
+  const std::string header = TranslateHeader(head + text + " } }\ninline namespace d { " + text + " }\n").header;
+  for (const char* piece :
+       {"\n} //c\n} //a\n", "\nnamespace a::inline b\n{\nnamespace c\n{\n", "\n} //d\n", "\ninline namespace d\n{\n"}) {
+    EXPECT_NE(std::string::npos, header.find(piece)) << piece << header;
+  }
+  EXPECT_EQ(std::count(header.begin(), header.end(), '{'), std::count(header.begin(), header.end(), '}')) << header;
+}
+
+// Without the key there are two forms, wherever the word stands; what no key makes C++ is an error with it, too.
+TEST_F(LookUp, FormsThatAreErrors) {
+  const std::vector<ErrorCase> always = {{"namespace ;", 1, "Expected identifier after namespace when read ;"},
+                                         {"\nnamespace 5 { }", 2, "Expected identifier after namespace when read 5"},
+                                         {"int a;\nnamespace", 2, "Expected identifier after namespace when read EOS"}};
+  AssertErrors(always);
+  AssertErrors({{"namespace a::b { }", 1, "Expected { after a when read ::"},
+                {"namespace fs = std::filesystem;", 1, "Expected { after fs when read ="},
+                {"namespace a EXPORT { }", 1, "Expected { after a when read EXPORT"},
+                {"namespace [[x]] a { }", 1, "Expected identifier after namespace when read ["},
+                {"\n#define OPEN namespace x::y {", 2, "Expected { after x when read ::"}});
+  EXPECT_EQ("", Fault("#define OPEN namespace x {\n$struct S { }; $type+ x::S; }"));
+  MakeWorld(TargetType::Application);
+  settings.modernCpp = true;
+  AssertErrors(always);
+}
+
+// Each of them took a second or more where the text behind was read for each.
+TEST_F(LookUp, ManyHeadsThatAreNone) {
+  settings.modernCpp = true;
+  for (const std::string word : {"namespace x ", "namespace [x\n", "namespace x(\n"}) {
+    std::string text = word;
+    while (text.size() < 1000000) text += text;
+    const auto begin = std::chrono::steady_clock::now();
+    EXPECT_EQ(text, Translate("t.cpp", text).substr(0, text.size()));
+    EXPECT_LT(std::chrono::steady_clock::now() - begin, std::chrono::seconds(20)) << word;
+    MakeWorld(TargetType::Application);
+  }
+}
+
 TEST_F(LookUp, NamespaceInPlainText) {
+  settings.modernCpp = true;
   for (const std::string text :
        {"namespace fs = std::filesystem;\n", "namespace fs = ::std::filesystem; int f() { return 1; }\n",
         "#include <boost/namespace.hpp>\n", "int x = F(namespace);\n", "namespace M(x)\n", "namespace M(x) ;\n",
         "#define OPEN namespace x {\n#define CLOSE }\n",
-        "  # define OPEN(a, b) \\\n  namespace a##b {\n#define CLOSE }\n", "namespace a::b = c;\n", "namespace 1 { }\n",
-        "namespace\n"}) {
+        "  # define OPEN(a, b) \\\n  namespace a##b {\n#define CLOSE }\n", "namespace a::b = c;\n"}) {
     EXPECT_EQ(text, Translate("t.cpp", text).substr(0, text.size())) << text;
     MakeWorld(TargetType::Application);
-    EXPECT_EQ("", Fault(text + "$struct S { }; $type+ ::S;")) << text;
+    EXPECT_EQ("", Fault("\n" + text + "$struct S { }; $type+ ::S;")) << text;
     MakeWorld(TargetType::Application);
   }
 }

@@ -55,6 +55,14 @@ TEST_F(TextChecksTest, OneWarningForEach) {
       {"$variant V { int32; };\n$model M { xmap<int32,V> v; };",
        "3) : warning W1018 : Model field v of $model M begins with no value of $variant V: give that a default or a "
        "void item"},
+      {"$variant V { int32; void free; };\n$model M { V v; };",
+       "3) : warning W1018 : Model field v of $model M begins with no value of $variant V: write default free(); in "
+       "that"},
+      {"$variant V { default void free; int32; };",
+       "2) : warning W1018 : The default of $variant V is an item, not a value: write default free(); and behind it "
+       "the "
+       "item void free;"},
+      {"$variant V { default free(); void free; int32; };\n$model M { V v; };", ""},
       {"$variant V { int32; };\n$variant W <<-ar>> { V; };", ""},
       {"$variant V { int32; };\n$variant W { int32; { V v; } item; };",
        "3) : warning W1018 : Item item of $variant W is read into no value of $variant V: give that a default or a "
@@ -121,6 +129,7 @@ TEST_F(TextChecksTest, OneWarningForEach) {
 }
 
 TEST_F(TextChecksTest, AModelThatHidesAnother) {
+  settings.compilableText = true;
   const std::string models = "$mixin M : model { int32 a; } { };\n$model Own { int32 b; };\n";
   const std::string warning =
       "t.h(4) : warning W1019 : $struct S archives and prints the model of $mixin M in place of its own: write one "
@@ -135,6 +144,31 @@ TEST_F(TextChecksTest, AModelThatHidesAnother) {
   AssertWarned(ladder + " $struct S : model Own mixin [ L60 ] { };", warning);
   AssertWarned(models + "$mixin L : mixin [ M ] { }; $struct S : model Own mixin [ L ] { };", warning);
   AssertWarned(models + "$struct S : mixin [ M ] { };", "");
+  settings.compilableText = false;
+  AssertWarned(models + "$struct S : model Own mixin [ M ] { };", "");
+}
+
+TEST_F(TextChecksTest, AReleaseBehindThatOfAModel) {
+  const std::string model =
+      "@import \"Vesk/vxObject/IObject.h\"\nnamespace n { $model M { int32 a; int32 b; $schema { 1: +a 4: +b } }; }\n";
+  const auto warning = [&](const std::string& definition) {
+    MakeWorld(TargetType::Application);
+    AddFile("m.h", model);
+    AddFile("t.cpp", "@import \"m.h\"\n" + definition);
+    Translate("t.cpp");
+    return Messages();
+  };
+  EXPECT_EQ("", warning("vxDefineTargetFunctions(app, 3)"));
+  settings.compilableText = true;
+  EXPECT_EQ(
+      "t.cpp(2) : warning W1020 : The target of the project writes archives of release 3, but $model n::M has release "
+      "4: nothing could read them, define the target with 4\n",
+      warning("vxDefineTargetFunctions(app, 3)"));
+  for (const char* definition :
+       {"vxDefineTargetFunctions(app, 4)", "vxDefineTargetFunctions(other, 3)", "vxDefineTargetFunctions(app, RELEASE)",
+        "int vxDefineTargetFunctions;", "$warning(disable: 1020) vxDefineTargetFunctions(app, 3)"}) {
+    EXPECT_EQ("", warning(definition)) << definition;
+  }
 }
 
 TEST_F(TextChecksTest, NumbersOfTheKey) {

@@ -164,8 +164,13 @@ TEST_F(ProjectTest, BlocksForOtherCompilers) {
     // A tag may have the name of a compiler.
     EXPECT_EQ(nullptr, TryLoad(std::string(kHeads) + "config { \"a|b\" [\"gcc\" \"vc8\"] }" + block)) << scope;
   }
-  AssertError(std::string(kHeads) + "+cpp (\"gcc\") -w", "(3) : Expected { when read -");
-  AssertError(std::string(kHeads) + "+cpp (\"gcc\") { -w", "(3) : Unexpected end of file");
+  AssertError(std::string(kHeads) + "+cpp (\"gcc\") -w", "(3) : Expected '{' when read -");
+  AssertError(std::string(kHeads) + "+cpp (\"gcc\") { -w", "(3) : Expected '}' when read -");
+
+  // What can be read is, with its warnings.
+  trace.clear();
+  Load(std::string(kHeads) + kConfigs + "+cpp (\"vc14\") { /Fr } -cpp (\"vc6\") { /H\"1\" } { }");
+  EXPECT_EQ("warning: Compiler switch /Fr is deprecated\nwarning: Compiler switch /H is deprecated\n", trace);
 }
 
 TEST_F(ProjectTest, OptionsOfConfigurations) {

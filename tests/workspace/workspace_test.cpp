@@ -139,6 +139,36 @@ TEST_F(GraphTest, LoadsThatFail) {
   EXPECT_EQ("*** Warning: project a already has subproject B/src/b.QRPJ\n", trace);
 }
 
+// The run goes on without it; what an earlier one wrote of it stays.
+TEST_F(GraphTest, AFileWithAnErrorBehindItsHeads) {
+  WriteProject("lib", "subproj { \"app\" } qrex { \"a.h\" : frob }");
+  WriteProject("app", "qrex subproj { \"lib\" } { \"b.h\" }");
+  Write("tree/lib/a.h", "int a;\n");
+  Write("tree/app/b.h", "int b;\n");
+  Write("lib.cbp", "old");
+  settings.workspaces = {"lib", "app"};
+  for (const RunMode mode : {RunMode::Gen, RunMode::Build, RunMode::Clean}) {
+    trace.clear();
+    settings.mode = mode;
+    EXPECT_TRUE(RunWorkspace(settings)) << trace;
+    EXPECT_NE(std::string::npos, trace.find("\ntree/lib/src/lib.qrpj(4) : Unknown option : frob\n")) << trace;
+  }
+  EXPECT_EQ("old", Read("lib.cbp"));
+  EXPECT_FALSE(FileExists("uinc/lib/src/lib.qrpj"));
+  EXPECT_FALSE(FileExists("qrexsource/x64/Debug/lib/a.h"));
+  EXPECT_TRUE(FileExists("uinc/app/src/app.qrpj") && FileExists("app.cbp"));
+}
+
+TEST_F(WorkspaceFileTest, NestedFiles) {
+  const auto name = [](int i) { return "w" + std::to_string(i) + ".qrws"; };
+  for (int i = 1; i < 1001; ++i) Write("tree/" + name(i), "\"w\" { \"" + name(i + 1) + "\" }");
+  Write("tree/" + name(999), "\"w\" { }");
+  EXPECT_EQ("", Run("\"all\" { \"w1.qrws\" }", true));  // 1,000 with the outermost
+  Write("tree/" + name(999), "\"w\" { \"w1000.qrws\" }");
+  const std::string message = "\ntree/w999.qrws(1) : Workspace files nested too deeply\n";
+  EXPECT_EQ(message, Run("\"all\" { \"w1.qrws\" }", false).substr(0, message.size()));
+}
+
 TEST_F(GraphTest, Identifiers) {
   WriteProject("a", "{ }");
   WriteProject("b", "{ }");

@@ -149,10 +149,11 @@ void ClassHead::ReadModel() {
 
 // A class that was only declared where the model was read may since have got a model that leads back to itself.
 void ClassHead::CheckReferencedModel(const ClassDef& model) {
+  size_t reached = 0;
   for (const ModelField* field : model.m_modelFields) {
     if (field->IsDropped()) continue;
     const std::string fault =
-        ExpansionFault(field->m_type, *model.owner.rootNameSpace, Expansion::AttributeStructs, &model);
+        ExpansionFault(field->m_type, *model.owner.rootNameSpace, Expansion::AttributeStructs, &model, &reached);
     if (!fault.empty()) m_parser.Fail("Field " + field->m_name + " : " + fault);
   }
 }

@@ -55,7 +55,7 @@ void CheckModelField(QrexParser& parser, const ClassDef& def, const ModelField& 
   }
   if (const NameSpaceElement* variant = VariantWithoutDefault(field.m_type, *def.owner.rootNameSpace)) {
     parser.WarnOfText("Model field " + field.m_name + " of " + PrintedElement(def) + " begins with no value of " +
-                          PrintedElement(*variant) + ": give that a default or a void item",
+                          HowToGiveDefault(*variant),
                       def);
   }
 }
@@ -129,8 +129,8 @@ void CheckLocal(QrexParser& parser, const ClassDef& def) {
 }  // namespace
 
 void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
-  CheckModels(parser, def);
   if (!parser.WantsCompilableText()) return;
+  CheckModels(parser, def);
   CheckEnclosing(parser, def);
   CheckArchivedModel(parser, def);
   CheckConstFields(parser, def);

@@ -26,6 +26,12 @@ Block::~Block() {
   m_out << "}" << m_suffix << "\n";
 }
 
+namespace {
+
+std::string_view InlineWord(const NameSpace& nameSpace) { return nameSpace.isInline ? "inline " : ""; }
+
+}  // namespace
+
 std::vector<const NameSpace*> EnclosingNameSpaces(const NameSpace* innermost) {
   std::vector<const NameSpace*> path;
   for (; innermost && !innermost->IsRoot(); innermost = innermost->parent) path.push_back(innermost);
@@ -35,18 +41,30 @@ std::vector<const NameSpace*> EnclosingNameSpaces(const NameSpace* innermost) {
 
 NameSpaceFrame::NameSpaceFrame(TextWriter& out, const NameSpace* innermost)
     : m_out(out), m_path(EnclosingNameSpaces(innermost)) {
-  for (const NameSpace* nameSpace : m_path) m_out << "namespace " << nameSpace->name << "\n{\n";
+  for (const NameSpace* nameSpace : m_path) {
+    m_out << InlineWord(*nameSpace) << "namespace " << nameSpace->name << "\n{\n";
+  }
 }
 
 NameSpaceFrame::~NameSpaceFrame() {
   for (auto it = m_path.rbegin(); it != m_path.rend(); ++it) m_out << "} // " << (*it)->name << "\n";
 }
 
+// Braces are closed and opened as the text around has them: one for each head, which may have several names.
 void WriteOutsideNameSpaces(TextWriter& out, const NameSpace* innermost, const std::function<void()>& write) {
   const std::vector<const NameSpace*> path = EnclosingNameSpaces(innermost);
-  for (auto it = path.rbegin(); it != path.rend(); ++it) out << "} //" << (*it)->name << "\n";
+  for (auto it = path.rbegin(); it != path.rend(); ++it) {
+    if (!(*it)->sharesBrace) out << "} //" << (*it)->name << "\n";
+  }
   write();
-  for (const NameSpace* nameSpace : path) out << "namespace " << nameSpace->name << "\n{\n";
+  for (size_t i = 0; i < path.size(); ++i) {
+    if (path[i]->sharesBrace) {
+      out << "::" << InlineWord(*path[i]) << path[i]->name;
+    } else {
+      out << InlineWord(*path[i]) << "namespace " << path[i]->name;
+    }
+    if (i + 1 == path.size() || !path[i + 1]->sharesBrace) out << "\n{\n";
+  }
 }
 
 std::string ExportPrefix(const NameSpaceElement& element) {

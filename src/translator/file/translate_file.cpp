@@ -13,6 +13,7 @@
 #include "translator/emit/write.h"
 #include "translator/file/keywords.h"
 #include "translator/file/predefined_variables.h"
+#include "translator/file/release_check.h"
 #include "translator/file/tails.h"
 #include "translator/reader/qrex_parser.h"
 #include "workspace/project_model.h"
@@ -75,6 +76,11 @@ class Importer : public ImportHandler {
   }
 
   std::string ImportHint(const std::string& path) const override { return m_file.ImportHint(path); }
+  std::string PlaceOf(const char* position) const override {
+    std::string path;
+    int64_t line;
+    return m_file.host.FindSourcePosition(position, path, line) ? path + "(" + std::to_string(line) + ")" : "";
+  }
 
  private:
   void ReportCycle(const ScannedFile& imported) const {
@@ -114,7 +120,11 @@ void TranslateText(ScannedFile& file, IOutputStream& target, TextRange expanded)
           "guard"_ = IncludeGuard(file.file.path));
     head.Flush();
   }
-  QrexParser(file, stream, out, expanded, AllKeywords()).Translate();
+  {
+    QrexParser parser(file, stream, out, expanded, AllKeywords());
+    parser.Translate();
+    if (kind == FileKind::Cpp && parser.WantsCompilableText()) CheckTargetRelease(parser);
+  }
   out.Flush();
   if (const char* last = stream.SourcePosition()) file.lineTable.push_back(last);
 

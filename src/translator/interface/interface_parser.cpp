@@ -284,8 +284,7 @@ void InterfaceStatement::CheckTextOfMethods() const {
           m_def->m_isIpc ? VariantWithoutDefault(argument.type, *m_def->owner.rootNameSpace) : nullptr;
       if (!variant) continue;
       m_parser.WarnOfText("Argument " + argument.name + " of " + method.name + " in " + text +
-                              " is read into no value of " + PrintedElement(*variant) +
-                              ": give that a default or a void item",
+                              " is read into no value of " + HowToGiveDefault(*variant),
                           *m_def);
     }
   }

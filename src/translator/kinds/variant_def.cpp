@@ -96,6 +96,13 @@ bool VariantDef::AnyItemVisits(Memo& memo, bool (*test)(TypeView, NameSpace&)) c
 bool VariantDef::IsIObjectVisitable() const { return AnyItemVisits(m_visitsObjects, NeedsVisitObjects); }
 bool VariantDef::IsPrefVisitable() const { return AnyItemVisits(m_visitsPrefs, NeedsVisitPrefs); }
 
+std::string_view VariantDef::NamedVoidItem() const {
+  for (const auto& item : m_items) {
+    if (item->isVoid && item->IsNamed()) return item->name;
+  }
+  return {};
+}
+
 uint32_t VariantDef::TypeOpsBits() const {
   uint32_t bits = kOpsDestruct;
   if (qualifiers.compare != TriState::Off) bits |= kOpsEqual | kOpsLess;

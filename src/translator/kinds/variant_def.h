@@ -38,6 +38,7 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
   bool HasSerialise() const;           // of its own
   bool CanSerialise() const override;  // as a type of items and fields
   bool HasDefaultValue() const override { return m_hasDefault; }
+  std::string_view NamedVoidItem() const override;
   bool IsIObjectVisitable() const override;
   bool IsPrefVisitable() const override;
   bool ItemVisits(const VariantItem& item, bool (*test)(TypeView, NameSpace&)) const;

@@ -26,6 +26,7 @@ class VariantStatement {
   void ReadDefault();
   void ReadItem();
   void ReadStruct(VariantItem& item);
+  void CheckTextOfDefault() const;
   ParsedType ReadTypeAndName(Naming naming);
 
   QrexParser& m_parser;
@@ -34,6 +35,7 @@ class VariantStatement {
   VariantDef* m_old = nullptr;
   std::unique_ptr<VariantDef> m_made;
   VariantDef* m_def = nullptr;
+  TextRange m_default;  // the expression
 };
 
 void VariantStatement::ReadHeading() {
@@ -76,6 +78,7 @@ void VariantStatement::ReadDefault() {
   }
   LexScanner expression(TextRange(begin, m_parser.current.text.begin));
   SkipWhiteSpace(expression);
+  m_default = expression;
   Write(m_parser.out, R"(
     $name$()
     {
@@ -167,6 +170,18 @@ void VariantStatement::CheckTextInClass() const {
   }
 }
 
+// "default void free;" has the form of an item, and `new (this) V(void free)` is no C++.
+void VariantStatement::CheckTextOfDefault() const {
+  LexScanner scanner(m_default, m_parser.scanner.dialect);
+  if (!m_parser.WantsCompilableText() || !NextToken(scanner).Is("void")) return;
+  const LexToken item = NextToken(scanner);
+  const std::string name = item.kind == kIdentifier ? item.text.Text() : "";
+  m_parser.WarnOfText(
+      "The default of " + PrintedElement(*m_def) + " is an item, not a value: write " +
+          (name.empty() ? "void;" : "default " + name + "(); and behind it the item void " + name + ";"),
+      *m_def);
+}
+
 void VariantStatement::CheckTextOfItems() const {
   if (!m_parser.WantsCompilableText() || !m_def->HasSerialise()) return;
   for (const auto& item : m_def->m_items) {
@@ -176,8 +191,7 @@ void VariantStatement::CheckTextOfItems() const {
       const NameSpaceElement* variant = VariantWithoutDefault(type, *m_def->owner.rootNameSpace);
       if (!variant) continue;
       m_parser.WarnOfText("Item " + item->EffectiveName() + " of " + PrintedElement(*m_def) +
-                              " is read into no value of " + PrintedElement(*variant) +
-                              ": give that a default or a void item",
+                              " is read into no value of " + HowToGiveDefault(*variant),
                           *m_def);
     }
   }
@@ -203,6 +217,7 @@ void VariantStatement::Parse() {
   m_parser.CheckReferences(*m_def);
   m_parser.CheckMetadata(*m_def);
   CheckTextInClass();
+  CheckTextOfDefault();
   CheckTextOfItems();
   m_parser.DropBehindCurrent();
 }

@@ -47,6 +47,7 @@ class ModelBlock {
   QrexParser& m_parser;
   ClassDef& m_def;
   const Expansion m_expansion;
+  size_t m_reached = 0;  // see ExpansionFault
 };
 
 size_t ModelBlock::IndexOf(std::string_view name) const {
@@ -117,7 +118,7 @@ void ModelBlock::CheckField(const ModelField& field, bool dropped) {
   const std::string_view fault = TypeFault(field.m_type, m_parser.Root(), context);
   if (!fault.empty()) m_parser.Fail(std::string(fault));
   if (dropped) return;  // it has no accessors
-  const std::string message = ExpansionFault(field.m_type, m_parser.Root(), m_expansion, &m_def);
+  const std::string message = ExpansionFault(field.m_type, m_parser.Root(), m_expansion, &m_def, &m_reached);
   if (!message.empty()) m_parser.Fail("Field " + field.m_name + " : " + message);
 }
 

@@ -8,15 +8,18 @@ namespace {
 
 class TypeExpansion {
  public:
-  TypeExpansion(NameSpace& root, Expansion expansion) : m_root(root), m_expansion(expansion) {}
+  TypeExpansion(NameSpace& root, Expansion expansion, size_t reached)
+      : m_root(root), m_expansion(expansion), m_reached(reached) {}
 
   void Enter(const ClassDef* def) { m_path.push_back(def); }
+  size_t Reached() const { return m_reached; }
 
   // `intoAnyClass`: the model of any class is followed, not only that of a class of kind model.
   std::string Fault(TypeView type, size_t depth, bool intoAnyClass) {
     const Undecorated undecorated = WithoutDecorators(type, m_root);
     type = undecorated.type;
-    if (depth > kMaxDepth || ++m_steps > kMaxSteps) return "type nested too deeply";
+    if (depth > kMaxDepth) return "type nested too deeply";
+    if (++m_reached > kMaxReached) return TooMany();
     const bool isMethods = m_expansion == Expansion::Methods;
     const uint32_t ending = isMethods ? ~uint32_t{kHasConst} : uint32_t{kHasAssignable};
     if (undecorated.decorators & ending) return {};
@@ -35,9 +38,14 @@ class TypeExpansion {
   }
 
  private:
-  // The text grows with the square of the depth, and with the number of fields reached.
+  // The text grows with the square of the depth, and with the number of fields reached: each writes about 1 KB.
   static constexpr size_t kMaxDepth = 50;
-  static constexpr size_t kMaxSteps = 100000;
+  static constexpr size_t kMaxReached = 10000;
+
+  std::string TooMany() const {
+    const std::string what = m_path.empty() ? "the type" : PrintedElement(*m_path.front());
+    return what + " has more than " + std::to_string(kMaxReached) + " fields, with those of the models in it";
+  }
 
   std::string ClassFault(TypeView type, size_t depth, bool intoAnyClass) {
     const NameSpaceElement* element = NamedElement(type, m_root);
@@ -57,15 +65,17 @@ class TypeExpansion {
   NameSpace& m_root;
   const Expansion m_expansion;
   std::vector<const ClassDef*> m_path;
-  size_t m_steps = 0;
+  size_t m_reached;
 };
 
 }  // namespace
 
-std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self) {
-  TypeExpansion way(root, expansion);
+std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self, size_t* reached) {
+  TypeExpansion way(root, expansion, reached ? *reached : 0);
   if (self) way.Enter(self);
-  return way.Fault(type, 0, expansion == Expansion::Methods);
+  std::string fault = way.Fault(type, 0, expansion == Expansion::Methods);
+  if (reached) *reached = way.Reached();
+  return fault;
 }
 
 }  // namespace qrex

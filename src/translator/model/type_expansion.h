@@ -17,7 +17,8 @@ enum class Expansion {
 };
 
 // Why a type can't be expanded ("$model Node contains itself"); empty when it can. `self`: the class whose model is
-// just being read or expanded, or null.
-std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self);
+// just being read or expanded, or null. `reached`: how many fields and elements the text has for `self` so far.
+std::string ExpansionFault(TypeView type, NameSpace& root, Expansion expansion, const ClassDef* self,
+                           size_t* reached = nullptr);
 
 }  // namespace qrex

@@ -64,7 +64,8 @@ QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWr
       expanded(expanded),
       m_keywords(keywords),
       m_copyPosition(expanded.begin),
-      m_nameSpaces{file.rootNameSpace.get()} {
+      m_nameSpaces{file.rootNameSpace.get()},
+      m_lineAsked(expanded.begin) {
   SetInput(expanded, file.frame.dialect);
 }
 
@@ -175,7 +176,9 @@ void QrexParser::Dispatch() {
     if (keyword.endsOn == EndsOn::LastToken) Advance();
     return;
   }
-  Fail("'$" + Printed(current) + "' is not a valid directive");
+  LexScannerException failure("'$" + Printed(current) + "' is not a valid directive", current);
+  if (Is(kOpenBracket)) failure.WithHint("an attribute stands ahead of the $, where it is plain text");
+  throw failure;
 }
 
 bool QrexParser::Accept(int32_t kind) {

@@ -177,9 +177,10 @@ class QrexParser : public ExpressionParser {
     LexToken brace;
   };
   void OpenNameSpace();
+  void OpenCppNameSpace();
   std::optional<NameSpaceHead> ReadNameSpaceHead();
   bool SkipBrackets(int32_t open, int32_t close);
-  bool StandsInDirective(const char* position) const;
+  bool StandsInDirective(const char* position);
   void EnterNameSpace(const std::string& name, const char* position);
   void CloseBrace();
   void Dispatch();
@@ -188,6 +189,7 @@ class QrexParser : public ExpressionParser {
   std::optional<TypeCode> ParseSuffixedType(bool reflected);
   TypeCode ParseInnerType(bool reflected);
   void CheckPlatformDependent() const;
+  [[noreturn]] void FailUnknown() const;
   TypeCode ParseArraySuffix();
   std::vector<FunctionArg> ParseArguments(const SignatureRules& rules);
   void ParseSignatureEnd(FunctionSignature& signature, const SignatureRules& rules);
@@ -203,6 +205,8 @@ class QrexParser : public ExpressionParser {
   };
   std::vector<OuterDepth> m_savedDepths;  // of the definitions of name spaces that are open
   int64_t m_braceDepth = 0;
+  const char* m_lineAsked;         // see StandsInDirective
+  bool m_lineIsDirective = false;  // of the line on which that stands
 };
 
 // Bounds the recursion of handlers that call each other for nested declarations, types or lists.

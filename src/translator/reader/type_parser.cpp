@@ -101,7 +101,7 @@ std::optional<TypeCode> QrexParser::ParseBaseType(bool reflected) {
       if (std::optional<TypeCode> type = ParseDecoratorType(reflected)) return type;
     }
     found = scope ? scope->Lookup(current.text.View()) : isScoped ? nullptr : FindName(current.text.View());
-    if (reflected && !found) Fail("Unrecognised identifier : " + current.text.Text());
+    if (reflected && !found) FailUnknown();
     Advance();
     if (Is(kLess)) {
       if (reflected) Fail("Error reading '<'. Templates cannot be reflected");
@@ -121,6 +121,14 @@ std::optional<TypeCode> QrexParser::ParseBaseType(bool reflected) {
   const std::string_view text(begin, static_cast<size_t>(previous.text.end - begin));
   AppendNamedType(type, op, op == kOpCppText ? text : found->GetQualifiedName());
   return type;
+}
+
+void QrexParser::FailUnknown() const {
+  LexScannerException failure("Unrecognised identifier : " + current.text.Text(), current);
+  if (!Is("std")) throw failure;
+  throw failure.WithHint(
+      "nothing of std is reflected: write string8 for std::string, xvector<T> for std::vector<T>, xmap<K,V> for "
+      "std::map<K,V>");
 }
 
 void QrexParser::CheckPlatformDependent() const {

@@ -9,10 +9,11 @@ namespace qrex {
 
 class Warnings {
  public:
-  static constexpr int kFirst = 1000, kLast = 1019;
-  static constexpr int kCannotCompile = 1018;  // only with compilableText
+  static constexpr int kFirst = 1000, kLast = 1020;
+  // Those of compilableText, without which `$warning` does not know them.
+  static constexpr int kCannotCompile = 1018;
   static constexpr int kTwoModels = 1019;
-  // `$warning` knows the last two under compilableText alone.
+  static constexpr int kEarlierRelease = 1020;
   static bool IsCode(int64_t code, bool compilableText) {
     return code >= kFirst && code <= kLast && (code < kCannotCompile || compilableText);
   }

@@ -135,6 +135,8 @@ class NameSpace : public NameSpaceElement {
   NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name is that of another kind
   NameSpaceElement& Add(std::unique_ptr<NameSpaceElement> element);  // sets `parent`; replaces what the map had
   bool IsRoot() const { return parent == nullptr; }
+  bool sharesBrace = false;  // where it was opened last, as `b` of "namespace a::b {"
+  bool isInline = false;     // known of C++ of today alone
   bool Empty() const { return m_elements.empty(); }
   const std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>>& Elements() const { return m_elements; }
 

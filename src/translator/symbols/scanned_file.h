@@ -42,6 +42,7 @@ class TranslationHost {
   virtual DeclarationRegistry& UnregisterMap() = 0;
   virtual SymbolIndex& Symbols() = 0;  // every declaration of this build
   virtual size_t NextFileIndex() = 0;  // 0, 1, 2, ...: given to each ScannedFile as it is made
+  virtual std::vector<const ScannedFile*> FilesOfProject() const = 0;  // those met so far, by path
   virtual void CountWarning() = 0;
   // The scanned file whose source text holds the position, and the line there; false when none does.
   virtual bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const = 0;

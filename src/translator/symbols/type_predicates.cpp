@@ -182,6 +182,14 @@ const NameSpaceElement* VariantWithoutDefault(TypeView decorated, NameSpace& roo
   return VariantWithoutDefault(type.Inner(), root);
 }
 
+std::string HowToGiveDefault(const NameSpaceElement& variant) {
+  const auto* behaviour = dynamic_cast<const TypeBehaviour*>(&variant);
+  const std::string item(behaviour ? behaviour->NamedVoidItem() : std::string_view());
+  const std::string advice =
+      item.empty() ? "give that a default or a void item" : "write default " + item + "(); in that";
+  return PrintedElement(variant) + ": " + advice;
+}
+
 int64_t SizeInBytes(TypeView decorated, NameSpace& root) {
   const TypeView type = WithoutDecorators(decorated, root).type;
   if (type.IsNamed()) return DeclaredSize(CategoryOf(type.Op()));

@@ -35,6 +35,7 @@ bool IsSerialisable(TypeView type, NameSpace& root);
 bool HasConstElements(TypeView type, NameSpace& root);  // of a container anywhere in it, but for fixed arrays
 // The first variant without a default value that a value of the type holds, also as an element; or null.
 const NameSpaceElement* VariantWithoutDefault(TypeView type, NameSpace& root);
+std::string HowToGiveDefault(const NameSpaceElement& variant);  // " $variant V: give that ...", the end of a warning
 bool NeedsVisitObjects(TypeView type, NameSpace& root);
 bool NeedsVisitPrefs(TypeView type, NameSpace& root);
 void CollectNamedTypes(TypeView type, NameSpace& root, std::vector<const NameSpaceElement*>& out);  // appends
@@ -64,7 +65,8 @@ class TypeBehaviour {
  public:
   virtual ~TypeBehaviour() = default;
   virtual bool CanSerialise() const = 0;
-  virtual bool HasDefaultValue() const { return true; }  // a variant may have none
+  virtual bool HasDefaultValue() const { return true; }          // a variant may have none
+  virtual std::string_view NamedVoidItem() const { return {}; }  // of a variant, the first; empty: it has none
   virtual bool IsIObjectVisitable() const = 0;
   virtual bool IsPrefVisitable() const = 0;
 };

@@ -1,0 +1,13 @@
+// Whether the release number of a project is that of its models.
+#pragma once
+
+namespace qrex {
+
+class QrexParser;
+
+// Warns where the file, which is translated, defines its project's target with a release that is earlier than the last
+// one of a model of the project: what it writes could not be read again. Known are the models of the files that the
+// build has read so far.
+void CheckTargetRelease(QrexParser& parser);
+
+}  // namespace qrex
