@@ -64,13 +64,13 @@ TEST_F(SystemTest, DeepStack) {
 
   // Who recurses without a bound is told when it ends.
   struct Careful {
-    static size_t Recurse(size_t depth) {
+    static size_t Recurse(size_t depth, volatile char* caller) {
       volatile char frame[1024];
-      frame[0] = static_cast<char>(depth);
-      return IsStackShort() ? depth + static_cast<size_t>(frame[0] & 0) : Recurse(depth + 1);
+      if (caller) caller[0] = 1;  // so that each level needs a frame of its own
+      return IsStackShort() ? depth : Recurse(depth + 1, frame);
     }
   };
-  EXPECT_TRUE(RunOnStack(size_t{1} << 24, [&] { depth = Careful::Recurse(0); }));
+  EXPECT_TRUE(RunOnStack(size_t{1} << 24, [&] { depth = Careful::Recurse(0, nullptr); }));
   EXPECT_GT(depth, 1000u);
   EXPECT_FALSE(IsStackShort());
 }
