@@ -2,11 +2,23 @@
 
 #include <algorithm>
 
+#include "platform/system.h"
+
 namespace qrex {
+
+namespace {
+
+// As deep as the imports are.
+void RequireStack(const ScannedFile& file) {
+  if (platform::IsStackShort()) throw LexScannerException("Imports nested too deeply at " + file.file.path, nullptr);
+}
+
+}  // namespace
 
 // The cache is set ahead of the imports, so that a cycle in a dependency file ends here.
 int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file) {
   if (file.latestSourceTime != 0) return file.latestSourceTime;
+  RequireStack(file);
   file.latestSourceTime = file.sourceTime != 0 ? file.sourceTime : builder.times.LastWriteTime(file.SourcePath());
   if (file.latestSourceTime == 0) return 0;
   for (ScannedFile* import : file.imports) {
@@ -28,6 +40,7 @@ int64_t TargetTime(ProjectBuilder& builder, ScannedFile& file) {
 
 int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer) {
   if (file.latestTargetTime != 0) return file.latestTargetTime;
+  RequireStack(file);
   file.latestTargetTime = TargetTime(builder, file);
   if (file.latestTargetTime == 0) {
     throw LexScannerException("Error - file not translated by qrex : " + file.file.path, nullptr)

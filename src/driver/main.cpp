@@ -1,6 +1,7 @@
 #include "driver/command_line.h"
 #include "platform/console.h"
 #include "platform/system.h"
+#include "text/trace.h"
 
 namespace {
 
@@ -16,7 +17,9 @@ int main(int argc, char** argv) {
   qrex::platform::TuneHeap();
   qrex::platform::BufferStdout();
   static auto& commandLine = *new qrex::CommandLine({argv, argv + argc});  // left to the end of the process
-  qrex::platform::RunOnStack(kStackSize, [&] { status = commandLine.Run(); });
+  if (!qrex::platform::RunOnStack(kStackSize, [&] { status = commandLine.Run(); })) {
+    qrex::WriteToConsole("Error : Not enough memory to run in\n");
+  }
   qrex::platform::FlushStdout();
   return status;
 }

@@ -14,6 +14,20 @@ namespace {
 
 constexpr size_t kLargeText = 1u << 20;
 
+// The one that is written to, until the expansion ends.
+struct OpenSink : ExpansionSink {
+  explicit OpenSink(MacroWorld& world) : world(world), outer(world.sink) {
+    if (outer) bytesOutside = outer->bytesOutside + outer->Bytes();
+    world.sink = this;
+  }
+  ~OpenSink() { world.sink = outer; }
+  OpenSink(const OpenSink&) = delete;
+  OpenSink& operator=(const OpenSink&) = delete;
+
+  MacroWorld& world;
+  ExpansionSink* const outer;
+};
+
 }  // namespace
 
 bool ImportHandler::ImportPath(const std::string&, const char*) { return false; }
@@ -297,14 +311,14 @@ std::string ExpansionContext::ExpandPart(const TextRange& part, int64_t stripInd
 
 std::string ExpandAside(LSFrame& frame, const TextRange& text, int64_t stripIndent, const TextRange* anchor) {
   if (text.Empty()) return {};
-  ExpansionSink sink;
+  OpenSink sink(frame.World());
   ExpansionContext(nullptr, frame, text, stripIndent, 0, sink, anchor).Run();
   return std::move(sink.output);
 }
 
 static std::string ExpandExpressionAside(LSFrame& frame, const TextRange& text, const TextRange* anchor) {
   if (text.Empty()) return {};
-  ExpansionSink sink;
+  OpenSink sink(frame.World());
   ExpansionContext context(nullptr, frame, text, 0, 0, sink, anchor);
   context.ReadAsExpression();
   context.Run();
@@ -362,7 +376,7 @@ TextRange ExpandWithMap(ImportHandler* handler, LSFrame& frame, const TextRange&
     ~Restore() { nesting = value; }
   } restore{frame.World().nesting};
   if (handler) restore.nesting = 0;
-  ExpansionSink sink;
+  OpenSink sink(frame.World());
   sink.expectedSize = text.Size() + text.Size() / (text.Size() < kLargeText ? 4 : 1);
   const bool changed = ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).RunUnlessPlain();
   map = std::move(sink.map);

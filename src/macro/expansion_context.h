@@ -12,6 +12,7 @@
 #include "lex/scanner.h"
 #include "macro/expand.h"
 #include "macro/expression_parser.h"
+#include "platform/system.h"
 
 namespace qrex {
 
@@ -57,13 +58,14 @@ class ExpansionContext {
   void EmitGenerated(std::string_view text) { EmitGenerated(text, m_outIndent); }
   void EmitGenerated(std::string_view text, LineIndent column);  // where its lines but the first begin
   void CheckPart(const TextRange& text) const {
-    if (m_world.nesting >= kMaxNesting) throw LexScannerException("Macro expansion nested too deeply", text.begin);
+    if (m_world.nesting >= kMaxNesting || platform::IsStackShort())
+      throw LexScannerException("Macro expansion nested too deeply", text.begin);
     if (m_world.nesting == 0) m_world.parts = 0;
     if (++m_world.parts > m_world.limits.parts) throw LexScannerException("Too many macro expansions", text.begin);
     CheckLength(text.Size());
   }
   void CheckLength(size_t added) const {
-    if (static_cast<int64_t>(m_sink.output.size() + added) <= m_world.limits.bytes) return;
+    if (static_cast<int64_t>(m_sink.bytesOutside + m_sink.Bytes() + added) <= m_world.limits.bytes) return;
     throw LexScannerException("Expanded text is too long", m_tokenText);
   }
   LineIndent CurrentColumn() const { return m_sink.AtLineStart() ? m_outIndent : m_sink.ColumnHere(); }

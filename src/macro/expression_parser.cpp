@@ -3,6 +3,7 @@
 #include <cmath>
 
 #include "lex/cpp_literals.h"
+#include "platform/system.h"
 #include "text/numbers.h"
 
 namespace qrex {
@@ -81,7 +82,7 @@ struct ExpressionGrammar {
 
   struct Nesting {
     explicit Nesting(ExpressionGrammar& grammar) : depth(grammar.parser.m_depth) {
-      if (depth >= kMaxNesting) {
+      if (depth >= kMaxNesting || platform::IsStackShort()) {
         throw LexScannerException("Expression nested too deeply", grammar.parser.current);
       }
       ++depth;

@@ -11,6 +11,7 @@
 
 namespace qrex {
 
+class ExpansionSink;
 class LSVariable;
 
 // A Bloom filter over all defined names: by first byte the lengths that occur, and a bit for some more of a name's
@@ -71,9 +72,9 @@ class DefinitionTable {
 
 // Bounds on one text with all that it calls: macros that multiply end with a message before time and memory do.
 struct ExpansionLimits {
-  int64_t parts = 100'000'000;  // bodies, blocks, arguments and conditions
-  int64_t bytes = int64_t{1} << 30;
-  int64_t iterations = 1'000'000;  // of one @while
+  int64_t parts = 100'000'000;       // bodies, blocks, arguments and conditions
+  int64_t bytes = int64_t{1} << 30;  // of all texts in progress, with their maps
+  int64_t iterations = 1'000'000;    // of one @while
 };
 
 struct MacroWorld {
@@ -81,8 +82,10 @@ struct MacroWorld {
   DefinitionTable definitions;
   size_t fileFrames = 0;  // made so far
   ExpansionLimits limits;
-  int nesting = 0;    // of expansions that run
-  int64_t parts = 0;  // of the text at nesting 0
+  ExpansionSink* sink = nullptr;  // of the innermost expansion
+  int nesting = 0;                // of expansions that run
+  int importDepth = 0;            // of files that are brought up to date for others
+  int64_t parts = 0;              // of the text at nesting 0
 };
 
 }  // namespace qrex

@@ -4,6 +4,7 @@
 
 #include "lex/literals.h"
 #include "platform/console.h"
+#include "platform/system.h"
 #include "text/files.h"
 #include "text/paths.h"
 
@@ -24,7 +25,7 @@ bool MpfwParser::Import(LSFrame&, const std::string& path, const char* position)
     throw LexScannerException("Couldn't open file " + expanded, position).WithHint(ImportHint(expanded));
   }
   if (m_importDepth == 0) m_isTooDeep = false;
-  if (m_importDepth >= kMaxImportDepth) {
+  if (m_importDepth >= kMaxImportDepth || platform::IsStackShort()) {
     m_isTooDeep = true;
     throw LexScannerException("Imports nested too deeply" + CycleText(found), position);
   }
@@ -201,7 +202,8 @@ bool MpfwParser::ParseVariableStatement(std::string* name, std::string* value) {
 }
 
 void MpfwParser::ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*parse)(MpfwParser& parser)) {
-  if (m_importDepth >= kMaxImportDepth) throw LexScannerException("Imports nested too deeply", m_importBegin);
+  if (m_importDepth >= kMaxImportDepth || platform::IsStackShort())
+    throw LexScannerException("Imports nested too deeply", m_importBegin);
   parser.m_importDepth = m_importDepth + 1;
   const TextRange expansion{std::string_view(file.expansion)};
   const LexToken leftover = [&] {

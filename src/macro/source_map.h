@@ -37,6 +37,9 @@ class SourceMap {
   void AddVerbatim(const char* begin, const char* end);  // one run with the one before when their sources are adjacent
   void AddGenerated(const char* source, size_t length);
   size_t PageCount() const { return m_pages.size(); }
+  size_t Bytes() const {  // of its runs
+    return (PageSize(PageCount()) - PageSize(0) - static_cast<size_t>(m_pageEnd - m_next)) * sizeof(SourceMapRun);
+  }
   const SourceMapRun* PageBegin(size_t page) const { return m_pages[page].get(); }
   const SourceMapRun* PageEnd(size_t page) const {
     return page + 1 == PageCount() ? m_next : PageBegin(page) + PageSize(page);
@@ -107,11 +110,14 @@ class ExpansionSink {
   }
   void WriteGenerated(std::string_view text, const char* source, LineIndent indent);
   bool AtLineStart() const { return output.empty() || output.back() == '\n'; }
+  // Of the text and its map: short runs take more than what they stand for.
+  size_t Bytes() const { return output.size() + map.Bytes(); }
   LineIndent ColumnHere() const { return LineIndent::AtOffset(output.size()); }
 
   std::string output;
   SourceMap map;
   size_t expectedSize = 0;  // the room to make once there is something to write
+  size_t bytesOutside = 0;  // of the expansions that wait for this one
 
  private:
   void MakeRoom();

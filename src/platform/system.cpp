@@ -192,18 +192,40 @@ LocalTime CurrentLocalTime() {
           static_cast<int>(now.tv_nsec / 1000000)};
 }
 
-// The stack of a thread of its own. It is mapped here, as the library would have all of its memory promised at once.
-void RunOnStack(size_t bytes, const std::function<void()>& body) {
-  void* const stack =
-      mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
-  if (stack == MAP_FAILED) return body();  // no room for it: the stack of the caller serves
-  mprotect(stack, 4096, PROT_NONE);        // what overflows it ends here
+namespace {
+
+constexpr size_t kLeastStack = 8 << 20;
+constexpr size_t kOneLevel = 1 << 20;  // more than one level of anything takes, under a sanitizer too
+constexpr size_t kGuard = 4096;        // what overflows the stack ends here
+
+thread_local uintptr_t stackBegin = 0;  // of the thread's own stack; 0: it has none of RunOnStack's
+
+// Mapped here, as the library would have all of its memory promised at once. Null: no room, not even for the least one.
+void* MapStack(size_t& bytes) {
+  const size_t least = std::min(bytes, kLeastStack);
+  for (;; bytes /= 2) {
+    if (bytes < least) return nullptr;
+    void* const stack =
+        mmap(nullptr, bytes, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
+    if (stack == MAP_FAILED) continue;
+    mprotect(stack, kGuard, PROT_NONE);
+    return stack;
+  }
+}
+
+}  // namespace
+
+bool RunOnStack(size_t bytes, const std::function<void()>& body) {
+  void* const stack = MapStack(bytes);
+  if (!stack) return false;
   struct Run {
     const std::function<void()>& body;
+    void* stack;
     std::exception_ptr failure;
-  } run{body, nullptr};
+  } run{body, stack, nullptr};
   const auto start = [](void* argument) -> void* {
     Run& run = *static_cast<Run*>(argument);
+    stackBegin = reinterpret_cast<uintptr_t>(run.stack) + kGuard;
     try {
       run.body();
     } catch (...) {
@@ -219,8 +241,12 @@ void RunOnStack(size_t bytes, const std::function<void()>& body) {
   pthread_attr_destroy(&attributes);
   if (isRunning) pthread_join(thread, nullptr);
   munmap(stack, bytes);
-  if (!isRunning) return body();
   if (run.failure) std::rethrow_exception(run.failure);
+  return isRunning;
+}
+
+bool IsStackShort() {
+  return stackBegin != 0 && reinterpret_cast<uintptr_t>(__builtin_frame_address(0)) < stackBegin + kOneLevel;
 }
 
 void SetSignals() {

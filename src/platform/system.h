@@ -32,8 +32,11 @@ struct LocalTime {
 };
 LocalTime CurrentLocalTime();
 
-// Runs `body` to its end on a stack of the given size; memory is only used as the stack grows. Exceptions go on.
-void RunOnStack(size_t bytes, const std::function<void()>& body);
+// Runs `body` to its end on a stack of the given size, or of the largest part of it that there is room for; memory is
+// only used as the stack grows. Exceptions go on. False: there is no room for the least stack that serves.
+bool RunOnStack(size_t bytes, const std::function<void()>& body);
+// Whether that stack may not hold another level of what is nested. What recurses as deep as its input asks here.
+bool IsStackShort();
 // From now on a write beyond the user's limit of file sizes fails, where it would end the process, and the ends of
 // tools are told.
 void SetSignals();

@@ -4,6 +4,7 @@
 
 #include "lex/literals.h"
 #include "platform/console.h"
+#include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
@@ -24,7 +25,8 @@ bool HoldsWildcard(const LexToken& token) {
 }  // namespace
 
 void ProjectParser::ParseTree(ProjectFolder& folder, const std::string& directory) {
-  if (++m_depth > kMaxNesting) throw LexScannerException("Blocks nested too deeply", current);
+  if (++m_depth > kMaxNesting || platform::IsStackShort())
+    throw LexScannerException("Blocks nested too deeply", current);
   RequireBrace();
   while (current.kind != kCloseBrace) ParseEntry(folder, directory);
   --m_depth;
@@ -120,7 +122,8 @@ void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFo
   if (searched.empty()) searched = ".";  // the folder of the run, when the search leads above the root
   if (!RealPathOf(searched, realPath)) return;
   if (std::find(search.open.begin(), search.open.end(), realPath) != search.open.end()) return;  // a link to itself
-  if (search.open.size() >= kMaxNesting) throw LexScannerException("Directories nested too deeply", current);
+  if (search.open.size() >= kMaxNesting || platform::IsStackShort())
+    throw LexScannerException("Directories nested too deeply", current);
   search.open.push_back(realPath);
   std::vector<std::string> names;
   FileOrDirIterator entries(searched + "/*");

@@ -3,6 +3,7 @@
 #include <cstring>
 
 #include "platform/error.h"
+#include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
@@ -55,7 +56,7 @@ Project* Workspace::LoadProject(const std::string& path) {
   const bool isRead = LoadProjectFile(project, path);
   m_byName.emplace(project.name, &project);
   if (!isRead) return nullptr;
-  if (m_loadDepth >= kMaxLoadDepth) {
+  if (m_loadDepth >= kMaxLoadDepth || platform::IsStackShort()) {
     TraceWriter() << "Error: Subprojects nested too deeply at " << path << "\n";
     return nullptr;
   }

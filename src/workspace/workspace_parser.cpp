@@ -1,6 +1,7 @@
 #include "workspace/workspace_parser.h"
 
 #include "lex/literals.h"
+#include "platform/system.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
 
@@ -36,7 +37,8 @@ void WorkspaceParser::ParseBlock(Project* parent) {
   if (current.kind != kOpenBrace) {
     throw LexScannerException("Expected { when read " + Printed(current), current);
   }
-  if (++m_depth > kMaxNesting) throw LexScannerException("Blocks nested too deeply", current);
+  if (++m_depth > kMaxNesting || platform::IsStackShort())
+    throw LexScannerException("Blocks nested too deeply", current);
   Advance();
   while (current.kind != kCloseBrace) {
     if (current.kind != kDoubleQuoted) {
@@ -66,7 +68,8 @@ void WorkspaceParser::ParseNested(const std::string& path) {
   for (const WorkspaceParser* open = this; open; open = open->m_outer) {
     if (open->m_path == fullPath) throw LexScannerException("Workspace file includes itself : " + path, previous);
   }
-  if (m_depth >= kMaxNesting) throw LexScannerException("Workspace files nested too deeply", previous);
+  if (m_depth >= kMaxNesting || platform::IsStackShort())
+    throw LexScannerException("Workspace files nested too deeply", previous);
   WorkspaceParser nested(m_workspace, fullPath, this);
   nested.m_depth = m_depth;
   MpfwSourceFile* file = LoadSourceFile(fullPath);

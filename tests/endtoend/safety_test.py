@@ -118,6 +118,20 @@ def writes_beyond_the_limit_of_file_sizes_fail(workspace):
     holds(output, "Error: File error (qrexsource/x64/Debug/app/src/a.cpp) : The file size exceeds the limit allowed")
 
 
+IMPORTS = 10000
+
+
+@in_workspace(lambda: {**FILES, "tree/app/src/app.qrpj": PROJECT.replace('"a.cpp"', '"*.h" "a.cpp"') % ("app", "Debug", "x64"),
+                       "tree/app/src/a.cpp": '@import "h0.h"\n', f"tree/app/src/h{IMPORTS}.h": "",
+                       **{f"tree/app/src/h{i}.h": f'@import "h{i + 1}.h"\n' for i in range(IMPORTS)}})
+def a_long_chain_of_imports_works_or_is_refused(workspace):
+    output = workspace.shell("(ulimit -v 300000; Qrex all.qrex translateOnly=true) || echo status $?")
+    if "status" in output:
+        holds(output, ".h(1) : error : ", " nested too deeply\n", "status 1\n")
+    for _ in range(2):
+        holds(workspace.run("all.qrex", "translateOnly=true"), "\nCompleted..")
+
+
 def a_folder_that_cannot_be_listed_is_told(binary):
     library = os.environ.get("QREX_FAULTS")  # the superuser lists any folder: the call itself has to fail
     folder = Path(__file__).resolve().parents[1] / "faults"
@@ -138,4 +152,5 @@ def a_folder_that_cannot_be_listed_is_told(binary):
 
 
 run_tests([names_do_not_run, sources_and_folders_are_names, a_quote_in_a_name_is_refused, builds_in_one_folder_follow_each_other, tools_speak_english,
-           writes_beyond_the_limit_of_file_sizes_fail, a_folder_that_cannot_be_listed_is_told])
+           writes_beyond_the_limit_of_file_sizes_fail, a_long_chain_of_imports_works_or_is_refused,
+           a_folder_that_cannot_be_listed_is_told])

@@ -184,7 +184,7 @@ TEST_F(MessagesTest, EndlessLoopEnds) {
 }
 
 TEST_F(MessagesTest, MultiplyingMacrosEnd) {
-  world.limits = {1000, 10000, 1000};
+  world.limits = {1000, 100000, 1000};
   std::string doubling = "@def a0 = \"0123456789\"\n";
   for (int i = 1; i < 20; ++i) {
     const std::string inner = "a" + std::to_string(i - 1);
@@ -193,6 +193,16 @@ TEST_F(MessagesTest, MultiplyingMacrosEnd) {
   EXPECT_NE(std::string::npos, Expand(doubling + "a19").find("Too many macro expansions"));
   world.limits.parts = ExpansionLimits().parts;
   EXPECT_NE(std::string::npos, Expand(doubling + "a19").find("Expanded text is too long"));
+
+  world.limits.bytes = 10000;
+  // What is alive counts: maps, which take more than the short runs they are of, and the texts that wait for another.
+  const std::string text(6000, 'x');
+  const std::string tooLong = "t(2) : Expanded text is too long";
+  std::string runs = "@def a = x\n";
+  for (int i = 0; i < 2000; ++i) runs += "a ";
+  EXPECT_EQ(tooLong, Expand(runs).substr(0, tooLong.size()));
+  EXPECT_EQ(tooLong, Expand("@def a = " + text + "\na @[a]").substr(0, tooLong.size()));
+  EXPECT_EQ(tooLong, Expand("@def a = " + text + "\na @str(a)").substr(0, tooLong.size()));
 }
 
 TEST_F(MessagesTest, DeepBracketsAreNoNesting) {

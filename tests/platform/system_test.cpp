@@ -65,6 +65,19 @@ TEST_F(SystemTest, DeepStack) {
   RunOnStack(size_t{1} << 28, [&] { depth = Deep::Recurse(60000); });
   EXPECT_EQ(60000u, depth);
   EXPECT_THROW(RunOnStack(1 << 20, [] { throw 1; }), int);
+
+  // Who recurses without a bound is told when it ends.
+  struct Careful {
+    static size_t Recurse(size_t depth) {
+      volatile char frame[1024];
+      frame[0] = 0;
+      if (IsStackShort()) return depth;
+      return Recurse(depth + 1) + static_cast<size_t>(frame[0]);  // read behind the call: no loop can serve
+    }
+  };
+  EXPECT_TRUE(RunOnStack(size_t{1} << 24, [&] { depth = Careful::Recurse(0); }));
+  EXPECT_GT(depth, 1000u);
+  EXPECT_FALSE(IsStackShort());
 }
 
 TEST_F(SystemTest, Times) {

@@ -7,6 +7,7 @@
 
 #include "lex/scanner.h"
 #include "macro/expand.h"
+#include "platform/system.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/trace.h"
@@ -47,19 +48,32 @@ std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const Scann
   return {};
 }
 
+constexpr int kMaxImportDepth = 50'000;
+
+struct Nested {
+  explicit Nested(int& depth) : depth(depth) { ++depth; }
+  ~Nested() { --depth; }
+  int& depth;
+};
+
 // Brings what the file under expansion imports up to date, and makes it visible.
 class Importer : public ImportHandler {
  public:
   explicit Importer(ScannedFile& file) : m_file(file) {}
 
-  bool Import(LSFrame&, const std::string& path, const char*) override {
+  bool Import(LSFrame& frame, const std::string& path, const char* position) override {
     ProjectFile* target = m_file.ResolveImport(path);
     if (!target) return false;
+    int& depth = frame.World().importDepth;
+    if (depth >= kMaxImportDepth || platform::IsStackShort()) {
+      throw LexScannerException("Imports nested too deeply", position);
+    }
     ScannedFile& imported = m_file.host.GetScannedFile(*target);
     if (!imported.file.project->usesQrex) {
       throw LexScannerException("File " + imported.SourcePath() + " is not part of a project using qrex", nullptr)
           .WithHint(m_file.UseHint(imported));
     }
+    const Nested nested(depth);
     BringUpToDate(imported);
 
     // A file in progress is not translated again, so a cycle shows as a chain from the import back to this file.

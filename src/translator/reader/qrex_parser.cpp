@@ -5,6 +5,7 @@
 
 #include "lex/cpp_literals.h"
 #include "lex/sections.h"
+#include "platform/system.h"
 #include "text/paths.h"
 #include "translator/reader/cpp_words.h"
 #include "translator/types/type_code.h"
@@ -202,7 +203,7 @@ void QrexParser::Fail(std::string message) const { throw LexScannerException(std
 
 void QrexParser::CheckNesting(size_t levels) const {
   constexpr size_t kMaxNesting = 1000;
-  if (levels >= kMaxNesting) Fail("Declarations nested too deeply");
+  if (levels >= kMaxNesting || platform::IsStackShort()) Fail("Declarations nested too deeply");
 }
 
 void QrexParser::SkipToMatching(int32_t open, int32_t close, std::string_view atEnd) {
