@@ -34,7 +34,11 @@ const vesk::string8 g_long(40, 'x');
 
 Item* MakeItem() { return $new Item(); }
 
-Choice MakeTree() { return Choice::node({Choice(g_long), Choice(Choice::node({Choice(Choice::inPlace(g_long))})), Choice(Choice::number(3))}); }
+Choice MakeTree()
+{
+    const Choice inner = Choice::node({Choice(Choice::inPlace(g_long))});
+    return Choice::node({Choice(g_long), inner, Choice(Choice::number(3))});
+}
 
 struct Items
 {
