@@ -136,7 +136,8 @@ void CheckOwnParts()
     CheckOwnParts<vesk::xlist<Branch>>({branch, branch}, [](auto const& c) -> auto const& { return c.front().list; });
     CheckOwnParts<vesk::xmap<int32, Branch>>({{0, branch}}, [](auto const& c) -> auto const& { return c[0].map; });
     vesk::DynArray<Tree> array = {tree, Leaf(1)};
-    array = array;
+    vesk::DynArray<Tree> const& same = array;
+    array = same;
     CHECK(array[0] == tree, true);
 
     CHECK(Throws([&] { array.resize(-1); }) && Throws([] { vesk::DynArray<int32> none(-1); }), true);
