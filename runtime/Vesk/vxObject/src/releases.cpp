@@ -1,7 +1,6 @@
 // The releases of projects: what archives say of them, and what a project may write.
 
-@import "Vesk/vxObject/Model.h"
-@import "Vesk/vxObject/Persist.h"
+@import "Vesk/vxObject/IObject.h"
 
 namespace vesk {
 
