@@ -67,6 +67,7 @@ def translate(binary, workspace_file, keys="", tree=HERE / "runtime" / "tree"):
 
 # What every program needs of the library; the rest is for values by name and JSON.
 LIBRARY = ("byte_code", "graph", "layout", "models", "objects", "registry", "releases", "remote", "sources", "vxObject")
+VALUES = ("access", "containers", "json_reader", "json_scalars", "json_scanner", "json_text", "json_writer", "value_types")
 
 
 def write_library(workspace, sources=LIBRARY):
@@ -237,9 +238,7 @@ def run_with_thread_sanitizer(binary, name, output, more_library=()):
 
 def test_threads(binary):
     """A graph, archives, a connection and JSON in each thread do not meet those of others."""
-    run_with_thread_sanitizer(binary, "threads", "0 0 0 0 0\n",
-                              ("access", "containers", "json_reader", "json_scalars", "json_scanner", "json_text",
-                               "json_writer", "value_types"))
+    run_with_thread_sanitizer(binary, "threads", "0 0 0 0 0\n", VALUES)
 
 
 def has_asio():
@@ -276,8 +275,9 @@ def test_sockets(binary):
 def test_memory(binary):
     """Each allocation of a scenario fails in turn: nothing is lost, destroyed twice or left wrong."""
     need("g++")
-    workspace, root = translate(binary, "memory.qrws")
+    workspace, root = translate(binary, "memory.qrws", "compilableText = true")
     with workspace:
+        write_library(workspace, (*LIBRARY, *VALUES))
         sources = sorted(workspace.path(f"{root}/memory/src").glob("*.cpp"))
         workspace.write("all.cpp", "".join(f'#include "{source}"\n' for source in [*sources, "library.cpp"]))
         workspace.shell(f"g++ -std=c++17 -g1 -fsanitize=address,undefined -I. -I{root} all.cpp -o memory")

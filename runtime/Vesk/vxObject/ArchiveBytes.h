@@ -81,10 +81,10 @@ struct Archive {
 
   ByteBuffer m_bytes;
   WrittenObjects m_objects;
-  bool m_writesAddresses = false;    // of objects, in place of the objects
-  bool m_hostOrder = false;          // scalars as the host has them: for bytes that stay in memory
-  InputArchive* m_answer = nullptr;  // of an `ipc` call, whose results are read through an Archive
-  WrittenModels* m_models = nullptr; // where the archive is to name the releases of what is in it
+  bool m_writesAddresses = false;     // of objects, in place of the objects
+  bool m_hostOrder = false;           // scalars as the host has them: for bytes that stay in memory
+  InputArchive* m_answer = nullptr;   // of an `ipc` call, whose results are read through an Archive
+  WrittenModels* m_models = nullptr;  // where the archive is to name the releases of what is in it
 };
 
 // What an archive may ask of its reader. Whatever takes bytes is bounded by the bytes that are left.

@@ -7,8 +7,8 @@
 #include <algorithm>
 #include <deque>
 #include <functional>
-#include <list>
 #include <limits>
+#include <list>
 #include <map>
 #include <set>
 #include <stdexcept>
@@ -155,7 +155,8 @@ class DynArray {
   }
   // std::length_error for a size below 0, or above what memory could hold.
   void resize(ssize_t size) {
-    if (size < 0 || size > std::numeric_limits<ssize_t>::max() / static_cast<ssize_t>(sizeof(T))) throw std::length_error("size of a DynArray");
+    constexpr ssize_t most = std::numeric_limits<ssize_t>::max() / static_cast<ssize_t>(sizeof(T));
+    if (size < 0 || size > most) throw std::length_error("size of a DynArray");
     DynArray items;
     if (size > 0) items.m_items = std::allocator<T>().allocate(static_cast<std::size_t>(size));
     std::uninitialized_value_construct_n(items.m_items, size);

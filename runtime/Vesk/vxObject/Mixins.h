@@ -77,11 +77,10 @@ template <typename T>
 T* DollarNew(T* object) {
   AssertFinalClass<T>();
   if constexpr (IsObjectClass<T>) {
-    const ptr<IObject> whole(object);
     try {
-      ObjectHeap::Get().Add(whole, sizeof(T));
+      ObjectHeap::Get().Add(ptr<IObject>(object), sizeof(T));
     } catch (...) {
-      whole->DestroyObject();
+      object->DestroyObject();
       throw;
     }
   }

@@ -15,8 +15,8 @@ struct XTarget {
   void operator=(XTarget const&) = delete;
 
   ConstStringZ m_name;
-  RSN m_rsn;                                    // the release that it writes
-  ReflectedClass const* m_latestModel = nullptr;  // of the registered ones that whose `$schema` ends with the last release
+  RSN m_rsn;                                      // the release that it writes
+  ReflectedClass const* m_latestModel = nullptr;  // the registered one whose `$schema` ends with the last release
 };
 
 // Those of the program and its modules.

@@ -12,10 +12,11 @@ namespace vesk {
 
 // How to learn the project of a model from its type.
 struct ModelKind {
-  ReflectedClass const* (*m_record)();        // may be null
-  XTarget const* (*m_ask)();                  // null, or answers null: it does not tell
-  std::atomic<bool> m_isChecked;              // by CheckModel
-  std::atomic<XTarget const*> m_asked;        // what it answered
+  ReflectedClass const* (*m_record)();  // may be null
+  XTarget const* (*m_ask)();            // null, or answers null: it does not tell
+  std::atomic<bool> m_isChecked;        // by CheckModel
+  std::atomic<bool> m_isAsked;
+  std::atomic<XTarget const*> m_asked;  // what it answered
 };
 
 // ArchiveError where the project of a registered model writes a release that is older than its `$schema`.
@@ -87,7 +88,7 @@ constexpr auto Question() -> XTarget const* (*)() {
 
 template <typename M>
 void NoteModelOfType(WrittenModels* models) {
-  static ModelKind kind = {RecordOf<M>, Question<M>(), {false}, {nullptr}};
+  static ModelKind kind = {RecordOf<M>, Question<M>(), {false}, {false}, {nullptr}};
   if (!kind.m_isChecked.load(std::memory_order_relaxed)) CheckModel(kind);
   if (models) models->Add(kind);
 }

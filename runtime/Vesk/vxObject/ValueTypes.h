@@ -53,10 +53,14 @@ class ValueTypes {
   ValueType const& Of(ReflectedType const& type);
   ValueType const& Of(ReflectedClass const& record);
   xvector<ValueField> const& FieldsOf(ValueType const& type);
+  // Null unless they were asked for before.
+  xvector<ValueField> const* KnownFieldsOf(ValueType const& type) const;
   // The type of a variant's item: null for an item without reflection.
   ValueType const* ItemOf(ReflectedVariant const& record, ssize_t item);
 
  private:
+  template <typename Fill>
+  ValueType const& Add(xstring const& text, Fill fill);
   void Resolve(ValueType& type, ReflectedType const& plain);
   void ResolveContainer(ValueType& type, ReflectedType const& plain);
   void AddFields(xvector<ValueField>& fields, ReflectedClass const& record, ssize_t offset);

@@ -50,6 +50,7 @@ void ReadObjectGraph(Bytes bytes) {
   vesk::InputArchive ar(std::move(bytes));
   vesk::pref<kinds::IDoc> root;
   try {
+    vesk::ReadObjectHead(ar);
     ar >> root;
     if (root) (void)Written(root);
   } catch (vesk::ArchiveError const&) {
@@ -107,7 +108,7 @@ std::vector<Bytes> Seeds() {
           Written(vesk::DynArray<vesk::string16>{vesk::string16(2, 'a')}),
           {1, 5},
           Written(vesk::xvector<vesk::cref<kinds::Size>>{&size, &size}),
-          Written(vesk::pref<kinds::IDoc>(&doc))};
+          vesk::WriteObject(vesk::ptr<kinds::IDoc>(&doc))};
 }
 
 }  // namespace

@@ -435,7 +435,8 @@ class JsonReader {
     }
   }
 
-  // After an error: references to objects that go are null again. Sets of references are emptied.
+  // After an error: references to objects that go are null again. Sets of references are emptied. It takes no memory,
+  // of which there may be none: a class whose fields are not known was not reached.
   void Forget(ValueType const& type, void* address) {
     if (m_objects.empty()) return;
     if (type.m_kind == VK_REFERENCE) {
@@ -444,17 +445,20 @@ class JsonReader {
           std::any_of(m_objects.begin(), m_objects.end(), [self](Object const& o) { return o.m_self == self; });
       if (goes) SetReference(type, address, AnyInterface());
     } else if (type.m_kind == VK_CLASS) {
-      for (ValueField const& field : m_types.FieldsOf(type)) {
+      xvector<ValueField> const* fields = m_types.KnownFieldsOf(type);
+      for (std::size_t i = 0; fields && i < fields->size(); ++i) {
+        ValueField const& field = (*fields)[i];
         void* const at = static_cast<octet_t*>(address) + field.m_offset;
         if (!IndepNodeAt(*type.m_class, address, field)) Forget(*field.m_type, at);
       }
     } else if (type.m_kind == VK_SET || (type.m_key && type.m_key->m_kind == VK_REFERENCE)) {
       ClearContainer(type, address);
     } else if (type.m_kind == VK_LIST || type.m_kind == VK_MAP) {
-      EachEntry(type, address, [&](void* entry) {
+      auto forget = [&](void* entry) {
         Forget(*type.m_item, type.ItemOf(entry));
         return true;
-      });
+      };
+      EachEntry(type, address, std::ref(forget));
     }
   }
 

@@ -154,7 +154,7 @@ XTarget::~XTarget() {
   {
     Targets& targets = Shared<Targets>();
     std::lock_guard<std::mutex> lock(targets.m_mutex);
-    targets.m_list.erase(std::find(targets.m_list.begin(), targets.m_list.end(), this));
+    targets.m_list.erase(std::remove(targets.m_list.begin(), targets.m_list.end(), this), targets.m_list.end());
   }
   if (IsProcessEnding(this)) return;
   UnregisterTarget(this);

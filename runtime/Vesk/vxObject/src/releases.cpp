@@ -1,7 +1,6 @@
 // The releases of projects: what archives say of them, and what a project may write.
 
-@import "Vesk/vxObject/Model.h"
-@import "Vesk/vxObject/Persist.h"
+@import "Vesk/vxObject/IObject.h"
 
 namespace vesk {
 
@@ -89,8 +88,11 @@ void WrittenModels::Add(XTarget const& project) {
 }
 
 void WrittenModels::AddNew(ModelKind& kind) {
+  if (kind.m_ask && !kind.m_isAsked) {
+    kind.m_asked = kind.m_ask();
+    kind.m_isAsked = true;
+  }
   XTarget const* project = kind.m_asked;
-  if (!project && kind.m_ask) kind.m_asked = project = kind.m_ask();
   if (!project) {
     if (ReflectedClass const* record = kind.m_record()) project = TargetOf(*record);
   }

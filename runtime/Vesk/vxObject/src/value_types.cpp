@@ -65,28 +65,32 @@ void SetOps(ValueType& type, TypeOps const& ops) {
 
 }  // namespace
 
-ValueType const& ValueTypes::Of(ReflectedType const& declared) {
-  const ReflectedType plain = Bare(declared);
-  const xstring text = vxMakeString(plain);
+template <typename Fill>
+ValueType const& ValueTypes::Add(xstring const& text, Fill fill) {
   const auto [at, isNew] = m_types.insert({text, ValueType()});
-  if (isNew) {
+  if (!isNew) return at->second;
+  try {
     at->second.m_text = text;
-    Resolve(at->second, plain);
+    fill(at->second);
+  } catch (...) {
+    m_types.erase(at);
+    throw;
   }
   return at->second;
 }
 
+ValueType const& ValueTypes::Of(ReflectedType const& declared) {
+  const ReflectedType plain = Bare(declared);
+  return Add(vxMakeString(plain), [&](ValueType& type) { Resolve(type, plain); });
+}
+
 ValueType const& ValueTypes::Of(ReflectedClass const& record) {
-  const auto [at, isNew] = m_types.insert({record.m_name, ValueType()});
-  ValueType& type = at->second;
-  if (isNew) {
-    type.m_text = record.m_name;
+  return Add(record.m_name, [&](ValueType& type) {
     type.m_code = RC_CLASS;
     type.m_kind = VK_CLASS;
     type.m_class = &record;
     SetOps(type, record.m_ops);
-  }
-  return type;
+  });
 }
 
 void ValueTypes::Resolve(ValueType& type, ReflectedType const& plain) {
@@ -152,9 +156,15 @@ void ValueTypes::ResolveContainer(ValueType& type, ReflectedType const& plain) {
 }
 
 xvector<ValueField> const& ValueTypes::FieldsOf(ValueType const& type) {
-  const auto [at, isNew] = m_fields.insert({type.m_class, {}});
-  if (isNew) AddFields(at->second, *type.m_class, 0);
-  return at->second;
+  if (xvector<ValueField> const* fields = KnownFieldsOf(type)) return *fields;
+  xvector<ValueField> fields;
+  AddFields(fields, *type.m_class, 0);
+  return m_fields[type.m_class] = std::move(fields);
+}
+
+xvector<ValueField> const* ValueTypes::KnownFieldsOf(ValueType const& type) const {
+  const auto at = m_fields.find(type.m_class);
+  return at == m_fields.end() ? nullptr : &at->second;
 }
 
 void ValueTypes::AddFields(xvector<ValueField>& fields, ReflectedClass const& record, ssize_t offset) {

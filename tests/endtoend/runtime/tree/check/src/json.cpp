@@ -262,7 +262,8 @@ void CheckJsonErrors()
     vesk::xvector<Reflected> large;
     CHECK(ErrorOf(large, "[{},{},{}]", limits), "line 1, column 1: more memory than is allowed");
     // What is written with the same limits is read, and nothing else.
-    const vesk::xmap<vesk::string8, vesk::xlist<vesk::xvector<vesk::string8>>> texts = {{"a", {{"", "b"}, {}}}, {"c", {}}};
+    typedef vesk::xlist<vesk::xvector<vesk::string8>> Texts;
+    const vesk::xmap<vesk::string8, Texts> texts = {{"a", {{"", "b"}, {}}}, {"c", {}}};
     const vesk::xset<int32> numbers = {1, 2, 3};
     Doc doc;
     doc.next = &doc;
@@ -279,10 +280,11 @@ void CheckJsonErrors()
                 if (isRead) copy->DestroyObject();
             }
             refused += !isRead;
-            if (isWritten != isRead) CHECK(bounds.m_memory + bounds.m_bytes + bounds.m_depth, "read as it is written");
+            if (isWritten != isRead) CHECK(vxMakeString(bounds.m_memory << ' ' << bounds.m_depth), "written and read");
         };
         vesk::JsonLimits bounds;
-        for (bounds.m_memory = 0; bounds.m_memory < 4000; bounds.m_memory += 7) compareWith(bounds, 2 * (bounds.m_memory % 2));
+        bounds.m_memory = 0;
+        for (; bounds.m_memory < 4000; bounds.m_memory += 7) compareWith(bounds, 2 * (bounds.m_memory % 2));
         CHECK(refused > 2 && refused < 500, true);
         for (bounds.m_depth = 0; bounds.m_depth < 10; ++bounds.m_depth) compareWith(bounds, 0);
         for (bounds.m_bytes = text.size() - 2; bounds.m_bytes < text.size() + 2; ++bounds.m_bytes) compareWith(bounds, 0);

@@ -53,3 +53,4 @@ struct Scenario
 };
 
 vesk::xvector<Scenario> ContainerScenarios();
+vesk::xvector<Scenario> ValueScenarios();
