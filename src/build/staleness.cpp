@@ -2,6 +2,8 @@
 
 #include <algorithm>
 
+#include "platform/system.h"
+
 namespace qrex {
 
 // The cache is set ahead of the imports, so that a cycle in a dependency file ends here.
@@ -38,10 +40,14 @@ int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file) {
   return file.latestTargetTime;
 }
 
+bool LiesAhead(const ProjectBuilder& builder, int64_t time) {
+  return time > builder.settings.begun && time > platform::SystemFileTime();
+}
+
 bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file) {
   if (TargetTime(builder, file) == 0) return true;
   const int64_t sourceTime = LatestSourceTime(builder, file);
-  return sourceTime == 0 || sourceTime >= file.translationTime;
+  return sourceTime == 0 || sourceTime >= file.translationTime || LiesAhead(builder, file.translationTime);
 }
 
 void MarkRegistered(ScannedFile& file) {

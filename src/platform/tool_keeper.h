@@ -31,6 +31,7 @@ class ToolKeeper {
 
  private:
   int Ask(const std::string& shellLine);
+  void WaitForEnd();
 
   pid_t m_process = -1;
   int m_socket = -1;
