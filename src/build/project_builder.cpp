@@ -1,6 +1,7 @@
 #include "build/project_builder.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "build/dependency_file.h"
 #include "build/reflection_tails.h"
@@ -170,6 +171,7 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
     file.needsWriting = TailsMoved(file);
   }
   if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
+  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.translationTime == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
     result = CompileResourceIfStale(file);
   }
@@ -178,8 +180,17 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   return result;
 }
 
+// What no run has translated registers something or not: the main source, which is to be compiled alone, has to know.
+// The file stays stale.
+void ProjectBuilder::LearnNames(ScannedFile& file) {
+  const bool needsWriting = std::exchange(file.needsWriting, false);
+  BringUpToDate(file);
+  file.needsWriting = needsWriting;
+}
+
 bool ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
-  if (LastWriteTime(file.SourcePath()) < LastWriteTime(ResourceObjectPath(*this, file.file))) return true;
+  const int64_t resourceTime = LastWriteTime(ResourceObjectPath(*this, file.file));
+  if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return true;
   return CompileResource(*this, file);
 }
 
@@ -188,7 +199,7 @@ bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
   const auto [known, isNew] = m_objectTimes.try_emplace(object);
   int64_t& objectTime = known->second;
   if (isNew) objectTime = times.LastWriteTime(object);
-  if (LatestTargetTime(*this, file) < objectTime) return true;
+  if (LatestTargetTime(*this, file) < objectTime && !LiesAhead(*this, objectTime)) return true;
   BringUpToDate(file);
   const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
   objectTime = times.LastWriteTime(object);
@@ -231,7 +242,7 @@ bool ProjectBuilder::LinkIfStale() {
   const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), [&](const std::string& input) {
                            return timeOf(input) > targetTime;
                          });
-  return isCurrent || MakeTarget(*this, target, inputs);
+  return (isCurrent && !LiesAhead(*this, targetTime)) || MakeTarget(*this, target, inputs);
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.

@@ -71,6 +71,7 @@ class ProjectBuilder : public TranslationHost {
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   bool ProcessFiles(const ProjectFile* singleFile);
   bool ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
+  void LearnNames(ScannedFile& file);
   bool CompileResourceIfStale(ScannedFile& file);
   bool CompileIfStale(ScannedFile& file);
   void ReportUnregistered() const;

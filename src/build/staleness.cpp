@@ -52,10 +52,14 @@ int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const Scann
   return file.latestTargetTime;
 }
 
+bool LiesAhead(const ProjectBuilder& builder, int64_t time) {
+  return time > builder.settings.begun && time > platform::SystemFileTime();
+}
+
 bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file) {
   if (TargetTime(builder, file) == 0) return true;
   const int64_t sourceTime = LatestSourceTime(builder, file);
-  return sourceTime == 0 || sourceTime >= file.translationTime;
+  return sourceTime == 0 || sourceTime >= file.translationTime || LiesAhead(builder, file.translationTime);
 }
 
 void MarkRegistered(ScannedFile& file) {

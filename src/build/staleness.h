@@ -11,6 +11,8 @@ namespace qrex {
 int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file);
 // The same over the translated files. Throws "Error - file not translated by qrex : ", whose hint tells the importer.
 int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer = nullptr);
+// A time that is still to come tells nothing of what is younger: the clock was ahead when the file was made.
+bool LiesAhead(const ProjectBuilder& builder, int64_t time);
 bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file);
 // Notes that a .cpp which was not translated in this run registers the headers of its project that it imports directly.
 void MarkRegistered(ScannedFile& file);

@@ -117,6 +117,8 @@ bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::str
     if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) {
       return object.Keep();
     }
+    // A tool that came to its own end clears away what it could not finish; gcc's driver may have been the one to end.
+    if (ran && !isGcc && !IsAbnormalEnd(returnCode)) object.Keep();
   } catch (const FileException& exception) {
     TraceWriter() << "Error: " << exception << "\n";
   }

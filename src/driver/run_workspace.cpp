@@ -461,7 +461,6 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (builds && !settings.translateOnly) {
     WaitForOtherBuilds(folder);
     if (!settings.outputNotes.DeleteNoted()) return false;
-    settings.tools.Start();
   }
   const auto run = std::make_shared<WorkspaceRun>(settings);
   if (loaded) *loaded = run;

@@ -9,6 +9,7 @@
 #include "macro/python_library.h"
 #include "platform/console.h"
 #include "platform/dynamic_library.h"
+#include "platform/system.h"
 #include "text/exceptions.h"
 #include "text/files.h"
 #include "text/text_writer.h"
@@ -33,6 +34,22 @@ constexpr char kBootstrap[] =
     "        stream_hooks.WriteToStdErr(string)\n"
     "sys.stdout = myStdOut()\n"
     "sys.stderr = myStdErr()\n";
+
+// What would end the process without a word, or make another program of it, is an error like sys.exit(); in a child of
+// this process it is what it ever was.
+constexpr char kGuards[] =
+    "def guard(name):\n"
+    "    import os, posix\n"
+    "    call, process = getattr(posix, name), os.getpid()\n"
+    "    def guarded(*arguments):\n"
+    "        if os.getpid() == process:\n"
+    "            raise SystemExit('os.%s(%s)' % (name, ', '.join(map(repr, arguments))))\n"
+    "        return call(*arguments)\n"
+    "    for module in (os, posix):\n"
+    "        setattr(module, name, guarded)\n"
+    "for name in ('_exit', 'execv', 'execve'):\n"
+    "    guard(name)\n"
+    "del guard, name\n";
 
 Library py;
 bool pythonStarted = false;
@@ -110,6 +127,10 @@ bool StartPython(std::string& error) {
   }
   if (importSite && !OwnedObject(py.PyImport_ImportModule("site"))) {
     error = "PyImport_ImportModule failed for the site module";
+    return false;
+  }
+  if (py.PyRun_SimpleStringFlags(kGuards, nullptr) != 0) {
+    error = "PyRun_SimpleString failed on the vesk bootstrap code";
     return false;
   }
   Object* mainModule = py.PyImport_AddModule("__main__");
@@ -190,17 +211,22 @@ void WritePythonValue(TextWriter& writer, Object* object, const char* position, 
   }
 }
 
-// The tool and Python's own file objects write to one output in turn.
-struct FlushBothWays {
-  FlushBothWays() { platform::FlushStdout(); }
-  ~FlushBothWays() { std::fflush(nullptr); }
+// The tool and Python's own file objects write to one output in turn. Paths of the run are relative to the folder in
+// which it began, wherever Python went.
+struct PythonScope {
+  PythonScope() { platform::FlushStdout(); }
+  ~PythonScope() {
+    std::fflush(nullptr);
+    folder.Return();
+  }
+  const platform::WorkingFolder folder;
 };
 
 }  // namespace
 
 std::string EvalPython(const std::string& expression, const char* position) {
+  const PythonScope scope;
   EnsurePython(position);
-  const FlushBothWays flush;
   const OwnedObject result(py.PyRun_StringFlags(expression.c_str(), kEvalInput, mainDict, mainDict, nullptr));
   if (!result) FailPython("Eval python error: ", position);
   MemoryTextWriter writer;
@@ -209,8 +235,8 @@ std::string EvalPython(const std::string& expression, const char* position) {
 }
 
 void RunPython(const std::string& fileName, const std::string& code, const char* position) {
+  const PythonScope scope;
   EnsurePython(position);
-  const FlushBothWays flush;
   const OwnedObject compiled(py.Py_CompileStringFlags(code.c_str(), fileName.c_str(), kFileInput, nullptr));
   if (!compiled) FailPython("Python compilation error: ", position);
   if (!OwnedObject(py.PyEval_EvalCode(compiled.get(), mainDict, mainDict))) FailPython("RunPython error: ", position);

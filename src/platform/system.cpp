@@ -1,5 +1,6 @@
 #include "platform/system.h"
 
+#include <fcntl.h>
 #include <malloc.h>
 #include <pthread.h>
 #include <sys/mman.h>
@@ -168,6 +169,14 @@ int RunCommand(ToolKeeper& tools, const std::string& line) {
 
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
 
+WorkingFolder::WorkingFolder() : m_descriptor(open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
+
+WorkingFolder::~WorkingFolder() {
+  if (m_descriptor >= 0) close(m_descriptor);
+}
+
+void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(m_descriptor); }
+
 std::string ProgramPath() {
   std::string path(PATH_MAX, '\0');
   const ssize_t length = readlink("/proc/self/exe", path.data(), path.size());
@@ -176,7 +185,6 @@ std::string ProgramPath() {
 }
 
 uint64_t CurrentThreadId() { return static_cast<uint64_t>(gettid()); }
-uint64_t CurrentProcessId() { return static_cast<uint64_t>(getpid()); }
 bool IsProcessRunning(uint64_t id) { return kill(static_cast<pid_t>(id), 0) == 0 || errno == EPERM; }
 
 LocalTime CurrentLocalTime() {

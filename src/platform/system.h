@@ -23,9 +23,21 @@ int RunCommand(ToolKeeper& tools, const std::string& line);
 void SetEnvironment(const std::string& name, const std::string& value);
 constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
 
+// The folder that the process works in, to come back to.
+class WorkingFolder {
+ public:
+  WorkingFolder();
+  ~WorkingFolder();
+  WorkingFolder(const WorkingFolder&) = delete;
+  WorkingFolder& operator=(const WorkingFolder&) = delete;
+  void Return() const;
+
+ private:
+  const int m_descriptor;
+};
+
 std::string ProgramPath();  // of this program, with symbolic links resolved; empty where the system does not tell
 uint64_t CurrentThreadId();
-uint64_t CurrentProcessId();
 bool IsProcessRunning(uint64_t id);
 struct LocalTime {
   int day, month, year, hour, minute, second, millisecond;

@@ -267,7 +267,7 @@ int ToolKeeper::Ask(const std::string& shellLine) {
   Reply reply;
   if (!SendAll(m_socket, &size, sizeof size) || !SendAll(m_socket, request.data(), size) ||
       !ReceiveAll(m_socket, &reply, sizeof reply)) {
-    Stop();  // it was killed, and the tool ended with it
+    WaitForEnd();  // without goodbye it ends the tool, unless it was killed, which the tool does not outlive either
     return kEndedBySignal + SIGKILL;
   }
   errno = reply.error;
@@ -285,6 +285,10 @@ void ToolKeeper::Stop() {
   if (m_process <= 0) return;
   const uint32_t goodbye = 0;
   SendAll(m_socket, &goodbye, sizeof goodbye);
+  WaitForEnd();
+}
+
+void ToolKeeper::WaitForEnd() {
   close(m_socket);
   while (waitpid(m_process, nullptr, 0) < 0 && errno == EINTR) {
   }

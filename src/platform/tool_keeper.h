@@ -21,8 +21,6 @@ class ToolKeeper {
   ToolKeeper(const ToolKeeper&) = delete;
   ToolKeeper& operator=(const ToolKeeper&) = delete;
 
-  // The keeper is started by the first tool; earlier, while this process is small, that costs less. False: errno.
-  bool Start();
   // Runs a line of the shell in the folder in which the keeper was started and waits for its end: the exit code, or
   // 128 and the signal that ended it. An interrupt of this process during the run counts as one that ended the tool.
   // -1 when it could not be run: errno.
@@ -30,7 +28,10 @@ class ToolKeeper {
   void Stop();  // waits until it has released its locks
 
  private:
+  // By the first tool: the fork costs as much as a small run that calls none. False: errno.
+  bool Start();
   int Ask(const std::string& shellLine);
+  void WaitForEnd();
 
   pid_t m_process = -1;
   int m_socket = -1;

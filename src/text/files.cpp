@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <boost/crc.hpp>
 #include <cstring>
-#include <functional>
 #include <future>
 #include <thread>
 
@@ -11,7 +10,7 @@
 #include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
-#include "text/numbers.h"
+#include "text/beside_file.h"
 
 namespace qrex {
 
@@ -190,40 +189,12 @@ bool LoadStream(std::string& out, const std::string& path) {
   return true;
 }
 
-namespace {
-
-constexpr std::string_view kBesideMark = ".qrex-";  // then the process
-constexpr std::string_view kBesideEnd = ".part";
-
-// Whether the file was to be written by a process that is gone.
-bool IsLeftover(std::string_view name) {
-  if (!name.ends_with(kBesideEnd)) return false;
-  name.remove_suffix(kBesideEnd.size());
-  const size_t mark = name.rfind(kBesideMark);
-  if (mark == std::string_view::npos) return false;
-  uint64_t process;
-  std::string error;
-  return ParseNumber(std::string(name.substr(mark + kBesideMark.size())), process, error) &&
-         !platform::IsProcessRunning(process);
-}
-
-}  // namespace
-
 void LeftoverSweep::Beside(const std::string& path) {
   const auto [folder, isNew] = m_swept.insert(path.substr(0, path.rfind('/') + 1));
   if (!isNew) return;
   for (const std::string& name : platform::PlainFileNames(*folder)) {
-    if (IsLeftover(name)) platform::RemoveFile(*folder + name);
+    if (BesideFile::IsNameOfOne(name)) platform::FileClaim::RemoveAbandoned(*folder + name);
   }
-}
-
-std::string BesidePath(const std::string& path) {
-  static const std::string kMarkOfThisProcess =
-      std::string(kBesideMark) + std::to_string(platform::CurrentProcessId()) + std::string(kBesideEnd);
-  const std::string folder = path.substr(0, path.rfind('/') + 1);
-  const std::string name = path.substr(folder.size());
-  if (name.size() + kMarkOfThisProcess.size() <= platform::kLongestName) return path + kMarkOfThisProcess;
-  return folder + std::to_string(std::hash<std::string>()(name)) + kMarkOfThisProcess;
 }
 
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly) {
@@ -231,7 +202,8 @@ void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarg
   if (readOnly == ReadOnlyTarget::Refuse && platform::IsReadOnlyFile(path)) {
     throw FileException(platform::kErrorAccessDenied, path);
   }
-  const std::string beside = BesidePath(path);
+  const BesideFile claim(path);
+  const std::string& beside = claim.Path();
   auto fail = [&] {
     const uint32_t code = platform::LastError();
     platform::RemoveFile(beside);

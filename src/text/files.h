@@ -60,9 +60,6 @@ class LeftoverSweep {
   std::unordered_set<std::string> m_swept;  // folders, with a slash at the end
 };
 
-// The name of this process's own under which a file is written before it takes the place of `path`; where that name
-// would be too long, a number stands for the file's.
-std::string BesidePath(const std::string& path);
 // Replaces the file as a whole: written beside, then renamed, so that a half-written file never stands under `path`.
 // Raises FileException. A read-only target fails with code 5, unless the flag is the caller's own: it was cleared, but
 // another run may just have set it again.

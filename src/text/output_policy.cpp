@@ -19,7 +19,7 @@ std::string WithCarriageReturns(std::string_view text) {
 }
 
 GeneratedFile::~GeneratedFile() {
-  if (m_isSpilled) platform::RemoveFile(m_besidePath);
+  if (m_spilled) platform::RemoveFile(m_spilled->Path());
 }
 
 namespace {
@@ -73,12 +73,11 @@ void GeneratedFile::RaiseFailure() const {
 
 void GeneratedFile::Spill() {
   Try([this] {
-    if (!m_isSpilled) {
+    if (!m_spilled) {
       CreateDirectories(m_path, false);
       m_leftovers.Beside(m_path);
-      m_besidePath = BesidePath(m_path);
-      if (!m_beside.Open(m_besidePath, FileMode::WriteBinary)) throw FileException(m_path);
-      m_isSpilled = true;
+      m_spilled.emplace(m_path);
+      if (!m_beside.Open(m_spilled->Path(), FileMode::WriteBinary)) throw FileException(m_path);
     }
     m_beside.Write(m_buffer.data(), m_used);
   });
@@ -86,27 +85,27 @@ void GeneratedFile::Spill() {
 }
 
 std::string GeneratedFile::Text() {
-  if (!m_isSpilled && !m_failure) return std::string(InMemory());
+  if (!m_spilled && !m_failure) return std::string(InMemory());
   Spill();
   std::string text;
   Try([&] {
     m_beside.Flush();
-    if (!ReadWholeFile(text, m_besidePath)) throw FileException(m_path);
+    if (!ReadWholeFile(text, m_spilled->Path())) throw FileException(m_path);
   });
   RaiseFailure();
   return text;
 }
 
 void GeneratedFile::Commit() {
-  if (!m_isSpilled && !m_failure) {
+  if (!m_spilled && !m_failure) {
     m_leftovers.Beside(m_path);
     return ReplaceFile(m_path, InMemory(), ReadOnlyTarget::Replace);
   }
   Spill();
   Try([this] { m_beside.Close(); });
   RaiseFailure();
-  if (!platform::RenameFile(m_besidePath, m_path)) throw FileException(m_path);
-  m_isSpilled = false;
+  if (!platform::RenameFile(m_spilled->Path(), m_path)) throw FileException(m_path);
+  m_spilled.reset();
 }
 
 namespace {

@@ -6,6 +6,7 @@
 #include <optional>
 #include <string>
 
+#include "text/beside_file.h"
 #include "text/files.h"
 #include "text/text_writer.h"
 
@@ -50,9 +51,8 @@ class GeneratedFile : public IOutputStream {
   boost::container::vector<char> m_buffer;  // grows without being cleared first
   size_t m_used = 0;
   File m_beside;
-  std::string m_besidePath;
-  bool m_isSpilled = false;
-  std::optional<uint32_t> m_failure;  // the error code of the first step that failed
+  std::optional<BesideFile> m_spilled;  // what m_beside writes to
+  std::optional<uint32_t> m_failure;    // the error code of the first step that failed
 };
 
 // Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time.

@@ -3,6 +3,7 @@
 
 Usage: faults_test.py BINARY [TEST...]. Each test is a function that works in a folder of its own."""
 
+import fcntl
 import os
 import re
 import shutil
@@ -31,6 +32,22 @@ def test_nothing_is_lost_when_an_error_ends_the_run():
     text = run('main.qrex', 'diagnostics=true')
     expect(re.findall(r'^Writing: .*/(.*)$', text, re.M) == ['y.cpp', 'app.cpp'], text)  # x.cpp was finished before
     expect(b'_Register_x1' in read(TRANSLATED + 'src/app.cpp') and b'_Register_x1' not in main_before, 'registration')
+
+
+def test_a_main_source_that_is_compiled_alone_registers_all():
+    write_tree()
+    compiled = ['main.qrex', 'mode=compile', '$COMPILE_FILE_PATH = "tree/app/src/app.cpp"']
+    run(*compiled)
+    expect(b'_Register_x0' in read(TRANSLATED + 'src/app.cpp'), 'x.cpp was never translated')
+    expect(not os.path.exists(TRANSLATED + 'src/x.cpp'), 'nor is it written')
+    holds(run('main.qrex', 'diagnostics=true'), 'Writing: ' + TRANSLATED + 'src/x.cpp')
+    alone = read(TRANSLATED + 'src/app.cpp')
+    shutil.rmtree('qrexsource')
+    run()
+    expect(read(TRANSLATED + 'src/app.cpp') == alone, 'as a whole build writes it')
+    edit('tree/app/src/y.cpp', '$bad\n')
+    os.remove(DEPENDENCIES)
+    holds(run(*compiled, status=1), "tree/app/src/y.cpp(1) : error : '$bad' is not a valid directive")
 
 
 def test_a_failed_translation_keeps_its_imports():
@@ -155,13 +172,13 @@ def test_leftovers_of_killed_runs_are_removed():
     write_tree()
     run()
     wanted = without_times(contents('qrexsource', 'out'))
-    killed = subprocess.Popen(['true'])
-    killed.wait()
     for path in files_of('qrexsource', 'out') + ['projects.guids']:
-        write(f'{path}.qrex-{killed.pid}.part', JUNK)
-    others = [f'projects.guids.qrex-{os.getpid()}.part', 'projects.guids.part']  # of a run that goes on, of the user
+        write(f'{path}.qrex-{os.getpid()}.part', JUNK)  # whose process does not matter: nobody holds it
+    others = ['projects.guids.qrex-12.part', 'projects.guids.part']  # of a run that goes on, of the user
     for path in others:
         write(path, JUNK)
+    held = open(others[0])
+    fcntl.flock(held, fcntl.LOCK_EX)
     subprocess.run('find qrexsource out -type f ! -name "*.part" -delete', shell=True)
     run()
     expect(without_times(contents('qrexsource', 'out')) == wanted, contents('qrexsource', 'out').keys())
@@ -172,10 +189,14 @@ def test_runs_at_the_same_time():
     write_tree({'tree/app/c.h': 'int c;\n' * 100000})
     run()
     wanted = without_times(contents('qrexsource', 'out'))
+    # each with the process numbers of the others, as in containers of their own
+    apart = ['unshare', '--pid', '--fork']
+    if subprocess.run([*apart, 'true'], stderr=subprocess.DEVNULL).returncode != 0:
+        apart = []
     for _ in range(4):
         shutil.rmtree('qrexsource')
         shutil.rmtree('out')
-        runs = [subprocess.Popen([BINARY, 'main.qrex'], stdout=subprocess.PIPE, text=True) for _ in range(4)]
+        runs = [subprocess.Popen([*apart, BINARY, 'main.qrex'], stdout=subprocess.PIPE, text=True) for _ in range(4)]
         for process in runs:
             text = process.communicate()[0]
             expect(process.returncode == 0 and 'rror' not in text and 'failed' not in text, text)

@@ -55,6 +55,24 @@ def an_empty_block_needs_no_python(binary):
     equal(generated, {"t.py": "text\n"})
 
 
+def what_would_end_the_tool_is_an_error(binary):
+    need_python(binary)
+    for call in ("os._exit(0)", "posix._exit(0)", "os.execl('/bin/true', 'true')"):
+        output, generated = translate(binary, {"t.py": f"@runpython {{ import os, posix; {call} }}\n"}, status=1)
+        holds(output, "app/src/t.py(1) : error : RunPython error: SystemExit: os.")
+        equal(generated, {})
+    code = "import os, subprocess; subprocess.check_call(['true']); child = os.fork()\nif not child: os._exit(0)\n"
+    _, generated = translate(binary, {"t.py": f"@runpython {{ {code} os.waitpid(child, 0)[1] }}\ntext\n"})
+    equal(generated, {"t.py": "text\n"})
+
+
+def the_folder_of_the_run_stays(binary):
+    need_python(binary)
+    _, generated = translate(binary, {"t.py": "@runpython { import os; os.chdir('/') }\n@defpython go = os.chdir('/usr') or 1\ngo\n",
+                                      "u.py": "text\n"})
+    equal(generated, {"t.py": "1\n", "u.py": "text\n"})
+
+
 def the_documented_example(binary):
     need_python(binary)
     blocks = re.findall(r"(?m)(?:^    .*\n)+", DOCS.read_text())
@@ -78,4 +96,4 @@ def exit_is_an_error(binary):
 
 
 run_tests([a_missing_library_is_named, an_empty_block_needs_no_python, the_documented_example, prints_keep_their_order,
-           exit_is_an_error])
+           exit_is_an_error, what_would_end_the_tool_is_an_error, the_folder_of_the_run_stays])

@@ -3,9 +3,12 @@
 calls tools has its folder for itself, and what is in the way is told."""
 
 import os
+import signal
+import struct
 import subprocess
 import sys
 import time
+import zlib
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
@@ -107,6 +110,51 @@ def builds_in_one_folder_follow_each_other(workspace):
     lacks(workspace.run("all.qrex", "translateOnly=true"), "Waiting")
 
 
+# A compiler and a linker that copy.
+COPYING = {"tools/gcc-4": "#!/bin/sh\neval set -- $(tr -d '\\r' < \"${2#@}\")\n"
+                          "while [ $# -gt 1 ]; do [ \"$1\" = -o ] && out=$2; shift; done\ncat \"$1\" > \"$out\"\n",
+           "tools/g++": "#!/bin/sh\neval set -- $(tr -d '\\r' < \"${1#@}\")\ncat \"$3\" > \"$2\"\n"}
+TARGET = "out/lib/x64/Debug/app"
+
+
+@in_workspace({**FILES, **COPYING})
+def a_parent_that_ignores_the_end_of_children(workspace):
+    done = subprocess.run([workspace.binary, "all.qrex"], cwd=workspace.folder, stdout=subprocess.PIPE, text=True,
+                          preexec_fn=lambda: signal.signal(signal.SIGCHLD, signal.SIG_IGN))
+    holds(done.stdout, "\nCompleted..")
+    lacks(done.stdout, "ode : ")
+    assert workspace.path(TARGET).exists()
+
+
+@in_workspace({**FILES, **COPYING, "x64/Debug/app/compiler.rsp": "", "out1.txt": ""})
+def files_of_ours_that_nobody_may_read_are_replaced(workspace):
+    for name in ("x64/Debug/app/compiler.rsp", "out1.txt"):
+        workspace.path(name).chmod(0)
+    holds(workspace.run("all.qrex"), "\nCompleted..")
+    assert not workspace.path("out1.txt").exists() and not workspace.path("x64/Debug/app/compiler.rsp").exists()
+
+
+@in_workspace({**FILES, **COPYING})
+def a_clock_that_was_ahead(workspace):
+    workspace.run("all.qrex")
+    hour = 3600 * 10**9
+    dependencies = workspace.path("qrexsource/x64/Debug/app.qrexdep")
+    data = dependencies.read_bytes()
+    at = 16 + data[16:].index(b"app/src/a.cpp") + len("app/src/a.cpp")
+    payload = bytearray(data[16:])
+    struct.pack_into("<q", payload, at - 16, struct.unpack_from("<q", data, at)[0] + hour // 100)
+    dependencies.write_bytes(data[:4] + struct.pack("<I", zlib.crc32(payload)) + data[8:16] + payload)
+    for name in workspace.times("qrexsource/**/*.cpp") | workspace.times("x64/**/*.o") | workspace.times(TARGET):
+        stamp = workspace.path(name).stat().st_mtime_ns + hour
+        os.utime(workspace.path(name), ns=(stamp, stamp))
+    workspace.append("tree/app/src/a.cpp", "int edited;\n")
+    workspace.run("all.qrex")
+    holds(workspace.path(TARGET).read_text(), "int edited;")
+    before = workspace.times("**/*")
+    workspace.run("all.qrex")
+    assert not [name for name in workspace.changed(before, "**/*") if name.endswith((".o", "/app"))], "nothing is left to do"
+
+
 @in_workspace({**FILES, "tools/gcc-4": '#!/bin/sh\necho "a.cpp:1: warning: $LC_ALL"\n'})
 def tools_speak_english(workspace):
     holds(workspace.run("all.qrex", LC_ALL="de_DE.UTF-8"), "warning: C\n")
@@ -151,6 +199,7 @@ def a_folder_that_cannot_be_listed_is_told(binary):
             holds(done.stdout, "app.qrpj(5) : Couldn't list folder tree/app/src : Access is denied.\n")
 
 
-run_tests([names_do_not_run, sources_and_folders_are_names, a_quote_in_a_name_is_refused, builds_in_one_folder_follow_each_other, tools_speak_english,
-           writes_beyond_the_limit_of_file_sizes_fail, a_long_chain_of_imports_works_or_is_refused,
+run_tests([names_do_not_run, sources_and_folders_are_names, a_quote_in_a_name_is_refused, builds_in_one_folder_follow_each_other,
+           tools_speak_english, a_parent_that_ignores_the_end_of_children, files_of_ours_that_nobody_may_read_are_replaced,
+           a_clock_that_was_ahead, writes_beyond_the_limit_of_file_sizes_fail, a_long_chain_of_imports_works_or_is_refused,
            a_folder_that_cannot_be_listed_is_told])

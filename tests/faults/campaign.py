@@ -15,6 +15,7 @@ import argparse
 import concurrent.futures
 import errno
 import os
+import random
 import re
 import shutil
 import subprocess
@@ -25,22 +26,25 @@ from pathlib import Path
 
 HERE = Path(__file__).resolve().parent
 sys.path.insert(0, str(HERE.parent / "endtoend"))
+import signals  # noqa: E402
+from signals import PAUSE  # noqa: E402
 from workspace_fixture import SETTINGS, Workspace  # noqa: E402
 
 # The tools: an object is its source, a library or program is what went into it.
 COMPILER = """#!/bin/sh
 eval set -- $(tr -d '\\r' < "${2#@}")
 while [ $# -gt 1 ]; do [ "$1" = -o ] && out=$2; shift; done
-cp "$1" "$out" && chmod u+w "$out"
+""" + PAUSE + """cp "$1" "$out" && chmod u+w "$out"
 """
 LIBRARIAN = """#!/bin/sh
 eval set -- "$2" $(tr -d '\\r' < "${3#@}")
-out=$1; shift; cat "$@" > "$out"
+out=$1; shift
+""" + PAUSE + """cat "$@" > "$out"
 """
 LINKER = """#!/bin/sh
 eval set -- $(tr -d '\\r' < "${1#@}")
 while [ $# -gt 0 ]; do case "$1" in -o) out=$2; shift;; -Xlinker) shift;; -*) ;; *) in="$in $1";; esac; shift; done
-cat $in > "$out"
+""" + PAUSE + """cat $in > "$out"
 """
 CLASSES = "".join(f"$struct+ S{i} {{ $int32 a; $int32 b; $int32 c; }};\n" for i in range(700))  # above 256 KiB of text
 
@@ -94,10 +98,13 @@ FAULTS = [  # call, how, error
     ("chmod", "fail", errno.EPERM), ("chmod", "kill", 0), ("utime", "fail", errno.EPERM), ("utime", "kill", 0),
     ("opendir", "fail", errno.EACCES), ("readdir", "fail", errno.EIO), ("fopen", "fail", errno.EMFILE),
     ("fwrite", "fail", errno.ENOSPC), ("fwrite", "short", 0), ("fflush", "fail", errno.ENOSPC),
-    ("fclose", "fail", errno.ENOSPC), ("system", "fail", errno.EAGAIN), ("system", "kill", 0),
+    ("fclose", "fail", errno.ENOSPC), ("fork", "fail", errno.EAGAIN), ("send", "fail", errno.EPIPE), ("send", "kill", 0),
+    ("recv", "fail", errno.ECONNRESET), ("recv", "kill", 0), ("keeper fork", "fail", errno.EAGAIN),
+    ("keeper fork", "kill", 0), ("keeper send", "kill", 0),
 ]
 KEPT = "same end state, a message where something is missing"
 INPUTS = ("tree/", "tools/", "all.qrex")
+COMBINATIONS = 60  # of several faults, for each kind of run
 
 
 IDENTIFIER = re.compile(rb"\{?[0-9A-F]{8}-[0-9A-F-]{27}\}?")
@@ -138,6 +145,8 @@ def lines(output):
 class Kind:
     """A kind of run: the workspace ahead of it, and what an undisturbed one leaves and says."""
 
+    Violation = Violation
+
     def __init__(self, binary, library, folder, name):
         self.binary, self.name, self.library = binary, name, library
         self.arguments, earlier = RUNS[name]
@@ -159,12 +168,17 @@ class Kind:
                 notes.write("the end\n")
         else:
             self.before = {}
+        calls = self.start / "tools/calls"
+        calls.unlink(missing_ok=True)
         end = self.copy(folder / "undisturbed")
         counts = folder / "counts"
         done = run(binary, end, self.arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts))
         self.require(done)
         self.expected, self.said = outputs(end), lines(done.stdout)
         self.counts = {call: int(count) for call, count in (line.split() for line in counts.read_text().splitlines())}
+        made = end / "tools/calls"
+        self.tools = len(made.read_text().splitlines()) if made.exists() else 0
+        self.counts.update({f"keeper {call}": self.tools for call in ("fork", "send")})
         shutil.rmtree(end)
 
     @staticmethod
@@ -184,7 +198,7 @@ class Kind:
             raise Violation(f"status {done.returncode}")
         left = outputs(folder)
         for name, content in left.items():
-            if not name.startswith(("qrexsource/", "out/include/", "out/source/")) or name.endswith(".part"):
+            if not name.startswith(("qrexsource/", "out/include/", "out/source/")) or name.endswith((".part", ".notes")):
                 continue
             if content not in (self.expected.get(name), self.before.get(name)):
                 raise Violation(f"{name} is torn")
@@ -197,10 +211,7 @@ class Kind:
         done = run(self.binary, folder, self.arguments)
         if done.returncode != 0:
             raise Violation("the next run fails: " + done.stdout.decode()[-600:])
-        left = outputs(folder)
-        if left != self.expected:
-            names = sorted(name for name in {**left, **self.expected} if left.get(name) != self.expected.get(name))
-            raise Violation(f"the next run ends with other files: {names}")
+        self.compare(folder, "the next run ends with other files:")
         times = lambda: {path: path.stat().st_mtime_ns for path in folder.rglob("*") if path.is_file()
                          and not path.name.endswith((".qrexdep", "projects.guids"))}
         before = times()
@@ -209,18 +220,27 @@ class Kind:
         if noted:
             raise Violation(f"there is something left to do: {noted}")
 
+    def compare(self, folder, what):
+        left = outputs(folder)
+        names = sorted(name for name in {**left, **self.expected} if left.get(name) != self.expected.get(name))
+        if names:
+            raise Violation(f"{what} {names}")
 
-def disturbed(kind, folder, call, at, how, number):
-    """One run with a fault at a call; what it broke, or None."""
+
+def disturbed(kind, folder, *faults):
+    """One run with faults at calls, each of them call, number of the call, how and error; what it broke, or None."""
     kind.copy(folder)
+    calls, points, ways, errors = (",".join(str(part) for part in column) for column in zip(*faults))
+    who = "keeper" if calls.startswith("keeper ") else "tool"
+    told = " and ".join(f"{call} {at} {how} {errno.errorcode.get(number, '')}" for call, at, how, number in faults)
     try:
-        done = run(kind.binary, folder, kind.arguments, LD_PRELOAD=kind.library, FAULT_CALL=call, FAULT_AT=str(at),
-                   FAULT_HOW=how, FAULT_ERRNO=str(number))
-        kind.check(folder, done, how == "kill")
+        done = run(kind.binary, folder, kind.arguments, LD_PRELOAD=kind.library, FAULT_CALL=calls.removeprefix("keeper "),
+                   FAULT_AT=points, FAULT_HOW=ways, FAULT_ERRNO=errors, FAULT_WHO=who)
+        kind.check(folder, done, "kill" in ways and who == "tool")
     except Violation as violation:
-        return f"{call} {at} {how} {errno.errorcode.get(number, '')}: {violation}"
+        return f"{told}: {violation}"
     except subprocess.TimeoutExpired:
-        return f"{call} {at} {how}: no end"
+        return f"{told}: no end"
     finally:
         shutil.rmtree(folder, ignore_errors=True)
     return None
@@ -269,7 +289,14 @@ def rows(kind, folder, short, mounts):
     for call, how, number in FAULTS:
         points = some(kind.counts.get(call, 0), 3 if short else 10**6)
         name = f"{call}: {how} {errno.errorcode.get(number, '')}".strip()
-        yield name, [(disturbed, kind, folder / f"{call}{at}", call, at, how, number) for at in points]
+        yield name, [(disturbed, kind, folder / f"{call}{at}", (call, at, how, number)) for at in points]
+    chance = random.Random(kind.name)
+    known = [fault for fault in FAULTS if kind.counts.get(fault[0]) and not fault[0].startswith("keeper")]
+    several = [[(call, chance.randint(1, kind.counts[call]), how, number)
+                for call, how, number in chance.sample(known, chance.choice([2, 3]))]
+               for _ in range(4 if short else COMBINATIONS)]
+    yield "two or three faults", [(disturbed, kind, folder / f"several{i}", *faults) for i, faults in enumerate(several)]
+    yield from signals.rows(kind, folder, short)
     if mounts:
         taken = sum(-(-path.stat().st_size // 4096) * 4 + 4 for path in kind.start.rglob("*")) + 8
         grows = sum(-(-len(content) // 4096) * 4 + 4 for content in kind.expected.values())
@@ -286,7 +313,7 @@ def build_library(folder):
 def main():
     parser = argparse.ArgumentParser(description=__doc__.splitlines()[0])
     parser.add_argument("binary", type=os.path.abspath)
-    parser.add_argument("--short", action="store_true", help="some calls of each kind, within a minute")
+    parser.add_argument("--short", action="store_true", help="some calls of each kind, within two minutes")
     parser.add_argument("--markdown", action="store_true", help="the table as docs/reliability.md has it")
     options = parser.parse_args()
     folder = Path(tempfile.mkdtemp(prefix="qrex-faults-"))

@@ -6,10 +6,12 @@
  *              the call)
  * FAULT_ERRNO  the number of the error
  * FAULT_STICKS set: all calls of the kind behind the one that failed fail too
+ * FAULT_WHO    keeper: the calls of the process that the tool forks to run tools, not those of the one that was started
  * FAULT_COUNTS a file that gets "NAME COUNT" lines when the process ends
  *
+ * The first four may be lists, separated by commas: several faults in one run.
  * Calls that the C library makes inside itself are not seen; so the stream functions are counted as calls of their own.
- * Only the process that was started is concerned, not the tools that it runs. */
+ * The tools that are run are not concerned. */
 #define _GNU_SOURCE
 #include <dirent.h>
 #include <dlfcn.h>
@@ -22,33 +24,55 @@
 #include <stdio_ext.h>
 #include <stdlib.h>
 #include <string.h>
+#include <sys/socket.h>
 #include <sys/stat.h>
 #include <sys/types.h>
+#include <sys/wait.h>
 #include <unistd.h>
 
 enum Call { OPEN, READ, WRITE, CLOSE, STAT, RENAME, UNLINK, MKDIR, CHMOD, UTIME, OPENDIR, READDIR, FOPEN, FWRITE, FFLUSH,
-            FCLOSE, SYSTEM, CALLS };
+            FCLOSE, FORK, SEND, RECV, WAITPID, CALLS };
 static const char* const kNames[CALLS] = {"open",  "read",    "write",   "close", "stat",   "rename", "unlink", "mkdir", "chmod",
-                                          "utime", "opendir", "readdir", "fopen", "fwrite", "fflush", "fclose", "system"};
+                                          "utime", "opendir", "readdir", "fopen", "fwrite", "fflush", "fclose", "fork", "send", "recv", "waitpid"};
 
 static atomic_long counts[CALLS];
-static int faulty = -1, error_number = EIO, is_short, kills, sticks;
-static long faulty_at;
-static pid_t started;
+static struct Fault {
+  int call, error, is_short, kills;
+  long at;
+} faults[4];
+static int fault_count, sticks, generation; /* 0: the process that was started, 1: its keeper, 2: a tool */
+static int faulty_generation;
+static __thread int error_number, is_short; /* of the call that goes wrong */
 static const char* counts_path;
 
-static void read_settings(void) {
-  const char *call = getenv("FAULT_CALL"), *at = getenv("FAULT_AT"), *how = getenv("FAULT_HOW"),
-             *number = getenv("FAULT_ERRNO");
-  started = getpid();
-  counts_path = getenv("FAULT_COUNTS");
-  for (int i = 0; call && i < CALLS; ++i) {
-    if (strcmp(call, kNames[i]) == 0) faulty = i;
+/* The n-th part of a list. */
+static const char* part(const char* list, int n, char* buffer, size_t size) {
+  for (; list && n > 0; --n) {
+    list = strchr(list, ',');
+    if (list) ++list;
   }
-  faulty_at = at ? atol(at) : 0;
-  if (number) error_number = atoi(number);
-  kills = how && strcmp(how, "kill") == 0;
-  is_short = how && strcmp(how, "short") == 0;
+  if (!list || !*list) return NULL;
+  snprintf(buffer, size, "%.*s", (int)strcspn(list, ","), list);
+  return buffer;
+}
+
+static void read_settings(void) {
+  char buffer[64];
+  const char *word, *who = getenv("FAULT_WHO");
+  counts_path = getenv("FAULT_COUNTS");
+  faulty_generation = who && strcmp(who, "keeper") == 0;
+  for (; fault_count < 4 && (word = part(getenv("FAULT_CALL"), fault_count, buffer, sizeof buffer)); ++fault_count) {
+    struct Fault* fault = &faults[fault_count];
+    fault->call = -1;
+    for (int i = 0; i < CALLS; ++i) {
+      if (strcmp(word, kNames[i]) == 0) fault->call = i;
+    }
+    fault->at = (word = part(getenv("FAULT_AT"), fault_count, buffer, sizeof buffer)) ? atol(word) : 0;
+    fault->error = (word = part(getenv("FAULT_ERRNO"), fault_count, buffer, sizeof buffer)) ? atoi(word) : EIO;
+    word = part(getenv("FAULT_HOW"), fault_count, buffer, sizeof buffer);
+    fault->kills = word && strcmp(word, "kill") == 0;
+    fault->is_short = word && strcmp(word, "short") == 0;
+  }
   sticks = getenv("FAULT_STICKS") != NULL;
   unsetenv("LD_PRELOAD"); /* the tools that it runs are left alone */
 }
@@ -56,7 +80,7 @@ static void read_settings(void) {
 __attribute__((constructor)) static void begin(void) { read_settings(); }
 
 __attribute__((destructor)) static void end(void) {
-  if (!counts_path || getpid() != started) return;
+  if (!counts_path || generation != 0) return;
   FILE* (*open_stream)(const char*, const char*) = (FILE * (*)(const char*, const char*)) dlsym(RTLD_NEXT, "fopen");
   int (*close_stream)(FILE*) = (int (*)(FILE*))dlsym(RTLD_NEXT, "fclose");
   FILE* out = open_stream(counts_path, "w");
@@ -65,13 +89,20 @@ __attribute__((destructor)) static void end(void) {
   close_stream(out);
 }
 
-/* Whether this call is the one that goes wrong. */
+/* Whether this call is one that goes wrong. */
 static int goes_wrong(enum Call call) {
-  if (getpid() != started) return 0;
+  if (generation != faulty_generation) return 0;
   const long number = atomic_fetch_add(&counts[call], 1) + 1;
-  const int wrong = (int)call == faulty && faulty_at > 0 && (number == faulty_at || (sticks && number > faulty_at));
-  if (wrong && kills) kill(started, SIGKILL);
-  return wrong;
+  for (int i = 0; i < fault_count; ++i) {
+    const struct Fault* fault = &faults[i];
+    if (fault->call != (int)call || fault->at <= 0) continue;
+    if (number != fault->at && !(sticks && number > fault->at)) continue;
+    if (fault->kills) kill(getpid(), SIGKILL);
+    error_number = fault->error;
+    is_short = fault->is_short;
+    return 1;
+  }
+  return 0;
 }
 
 #define REAL(result, name, ...)                                    \
@@ -229,8 +260,28 @@ int fclose(FILE* stream) { /* closes all the same; what was buffered is lost */
   return EOF;
 }
 
-int system(const char* command) {
-  REAL(int, "system", const char*);
-  FAILS(SYSTEM, -1)
-  return real(command);
+pid_t fork(void) {
+  REAL(pid_t, "fork", void);
+  FAILS(FORK, -1)
+  const pid_t child = real();
+  if (child == 0) ++generation;
+  return child;
+}
+
+ssize_t send(int socket, const void* data, size_t size, int flags) {
+  REAL(ssize_t, "send", int, const void*, size_t, int);
+  FAILS(SEND, -1)
+  return real(socket, data, size, flags);
+}
+
+ssize_t recv(int socket, void* data, size_t size, int flags) {
+  REAL(ssize_t, "recv", int, void*, size_t, int);
+  FAILS(RECV, -1)
+  return real(socket, data, size, flags);
+}
+
+pid_t waitpid(pid_t process, int* status, int flags) {
+  REAL(pid_t, "waitpid", pid_t, int*, int);
+  FAILS(WAITPID, -1)
+  return real(process, status, flags);
 }

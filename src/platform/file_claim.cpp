@@ -1,0 +1,39 @@
+#include "platform/file_claim.h"
+
+#include <fcntl.h>
+#include <sys/file.h>
+#include <sys/stat.h>
+#include <unistd.h>
+
+#include <cerrno>
+
+#include "platform/error.h"
+
+namespace qrex::platform {
+
+FileClaim::~FileClaim() {
+  if (m_descriptor >= 0) close(m_descriptor);
+}
+
+// Between the two calls a sweep may have locked and removed it.
+bool FileClaim::Make(const std::string& path) {
+  SetLastError(0);
+  m_descriptor = open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+  if (m_descriptor < 0) return false;
+  const bool isTaken = flock(m_descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
+  struct stat status;
+  if (!isTaken && (fstat(m_descriptor, &status) != 0 || status.st_nlink > 0)) return true;
+  close(m_descriptor);
+  m_descriptor = -1;
+  errno = EEXIST;
+  return false;
+}
+
+void FileClaim::RemoveAbandoned(const std::string& path) {
+  const int descriptor = open(path.c_str(), O_RDONLY | O_NONBLOCK | O_NOFOLLOW | O_CLOEXEC);
+  if (descriptor < 0) return;
+  if (flock(descriptor, LOCK_EX | LOCK_NB) == 0) unlink(path.c_str());
+  close(descriptor);
+}
+
+}  // namespace qrex::platform
