@@ -12,6 +12,11 @@
 
 namespace vesk {
 
+struct IPersistable;  // of IObject.h, which imports this file
+
+// The class of an object; null for null.
+ReflectedClass const* ClassOf(ptr<IPersistable> const& object);
+
 // --- Writing
 
 // Sets a flag while it lives.
@@ -39,10 +44,10 @@ void WriteObjectMention(Archive& ar, ptr<I> const& object) {
   ptr<IPersistable> persistable;
   if (object && !ar.m_writesAddresses) {
     persistable = QueryInterface<IPersistable>(object);
-    if (!persistable || !persistable->GetReflectedClass()) throw ArchiveError("object is not persistable");
+    if (!ClassOf(persistable)) throw ArchiveError("object is not persistable");
   }
   if (!WriteMention(ar, {object.Object(), persistable.Any(), WritePersistable}, typeid(void))) return;
-  ar << xstring(persistable->GetReflectedClass()->m_name);
+  ar << xstring(ClassOf(persistable)->m_name);
   WriteContents(ar);
 }
 
@@ -107,32 +112,7 @@ ssize_t ReadReference(InputArchive& ar, Make make) {
 bool ListsInterface(ReflectedClass const& record, ConstStringZ name);
 
 // Makes an object of the class that the archive names. `fits`: whether a class is what the reference asks for.
-template <typename Fits>
-NumberedObject MakePersistable(InputArchive& ar, Fits fits) {
-  xstring name;
-  ar >> name;
-  ReflectedClass const* record = Find<ReflectedClass>(name);
-  if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
-  if (!fits(*record) || !ListsInterface(*record, GetReflectedInterface<IPersistable>().m_name)) {
-    throw ArchiveError("not the class of the reference: " + name);
-  }
-  if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
-  const ptr<IPersistable> made = QueryInterface<IPersistable>(record->m_create());
-  if (!made) throw ArchiveError("not persistable: " + name);
-  NumberedObject object;
-  object.m_self = made.Object();
-  object.m_persistable = made.Any();
-  object.m_type = &typeid(void);
-  object.m_read = [](InputArchive& input, NumberedObject const& o) {
-    ptr<IPersistable>(o.m_persistable)->Deserialise(input);
-  };
-  object.m_forget = [](NumberedObject const& o) {
-    ReferenceCleaner cleaner;
-    ptr<IPersistable>(o.m_persistable)->VisitPrefs(cleaner);
-  };
-  object.m_destroy = [](NumberedObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
-  return object;
-}
+NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedClass const&)> const& fits);
 
 template <typename C>
 NumberedObject MakeStruct() {
@@ -177,7 +157,7 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
     position = ReadReference(ar, [&] { return MakePersistable(ar, isClass); });
     if (position >= 0) {
       const ptr<IPersistable> object(ar.m_objects.m_list[position].m_persistable);
-      ReflectedClass const* record = object ? object->GetReflectedClass() : nullptr;
+      ReflectedClass const* record = ClassOf(object);
       fits = record && isClass(*record);
     }
   } else {
