@@ -199,12 +199,13 @@ class SocketChannel : public Channel {
     }
     bool Take(xvector<octet_t>& message) {
       if (!HasMessage()) return false;
-      const std::size_t tooLong = m_framed > 0 ? 0 : std::exchange(m_tooLong, 0);
+      const std::size_t tooLong = m_framed > 0 ? 0 : m_tooLong;
       const std::size_t length = tooLong > 0 ? std::min(tooLong, MessageTooLong::HeadBytes) : LengthAt(0);
       const auto begin = m_in.begin() + static_cast<ssize_t>(kLengthBytes);
       message.assign(begin, begin + static_cast<ssize_t>(length));
       m_in.erase(m_in.begin(), begin + static_cast<ssize_t>(length));
       if (tooLong > 0) {
+        m_tooLong = 0;
         FindMessages();
       } else {
         m_framed -= kLengthBytes + length;
