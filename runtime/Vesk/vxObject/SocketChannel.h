@@ -111,7 +111,7 @@ class SocketChannel : public Channel {
   }
 
  private:
-  // Lives as long as an operation of the socket is under way. An operation that cannot begin, for want of memory, closes.
+  // Lives as long as an operation of the socket is under way. One that cannot begin, for want of memory, closes it.
   struct State : std::enable_shared_from_this<State> {
     State(Tcp::socket socket, bool waits) : m_socket(std::move(socket)), m_waits(waits) {}
 
@@ -325,7 +325,7 @@ class SocketServer {
       StartAccept();
       RunEvents(waits);
       ServeClients(isDone);
-      waits = std::none_of(m_clients.begin(), m_clients.end(), [](Client& client) { return client.m_channel.CanServe(); });
+      waits = std::none_of(m_clients.begin(), m_clients.end(), [](Client& c) { return c.m_channel.CanServe(); });
     }
   }
   // Ends ServeUntil; from any thread.

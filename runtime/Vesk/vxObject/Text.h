@@ -33,8 +33,8 @@ using vesk::xstring;
 }  // namespace unqualified
 
 // Writes to a std::ostream, or without one into memory. What is written into memory without an indentation is put where
-// there is room for it at once; all else, and where there is none, goes the long way. With a target each insertion is one
-// write to it, and what is kept besides is atomic, so that threads may share a stream as far as they may share its target.
+// there is room for it at once; all else, and where there is none, goes the long way. With a target each insertion is
+// one write to it, and what is kept besides is atomic: threads may share the stream as far as they may its target.
 class xostream {
  public:
   explicit xostream(std::ostream& target) : m_target(&target) {}

@@ -173,7 +173,8 @@ void CheckLeaving()
         Raw raw(host);
         raw.Send(kSay, 2);
         raw.End();
-        host.Serve(Time(5000), [&, seen = false]() mutable { return (seen = seen || host.server.Clients()) && !host.server.Clients(); });
+        host.Serve(Time(5000), [&] { return host.server.Clients() == 1; });
+        host.Serve(Time(5000), [&] { return host.server.Clients() == 0; });
         CHECK(raw.Rest() == (Bytes{5, 0, 0, 0, 9, 0, 2, 'x', 'x', 5, 0, 0, 0, 9, 0, 2, 'x', 'x'}));
     }
     {
@@ -205,7 +206,7 @@ void CheckFlood()
     sending.join();
 }
 
-// At the limit of descriptors the clients that are there are served, and those that wait later; nothing spins meanwhile.
+// At the limit of descriptors the clients that are there are served, those that wait later, and nothing spins.
 void CheckDescriptors()
 {
     Host host;
