@@ -3,6 +3,7 @@
 
 @import "Vesk/vxObject/Containers.h"
 
+#include <algorithm>
 #include <chrono>
 #include <deque>
 #include <stdexcept>
@@ -27,7 +28,18 @@ class ChannelClosed : public RemoteError {
   using RemoteError::RemoteError;
 };
 
-// Carries whole messages, in order. Send and the two Receives throw RemoteError where the transport fails.
+// The message that comes next was too long to be kept: it is gone but for its first bytes, which say whose it was.
+class MessageTooLong : public RemoteError {
+ public:
+  MessageTooLong(std::size_t size, std::size_t limit, xvector<octet_t> head);
+  xvector<octet_t> const& Head() const { return m_head; }
+  static constexpr std::size_t HeadBytes = 5;  // an answer's number takes no more
+
+ private:
+  xvector<octet_t> m_head;
+};
+
+// Carries whole messages, in order. Send and the Receives throw RemoteError where the transport fails.
 class Channel {
  public:
   virtual ~Channel() {}
@@ -36,8 +48,12 @@ class Channel {
   virtual bool Receive(xvector<octet_t>& message) = 0;
   // Waits up to `time` for a message where the channel can wait. False when none came.
   virtual bool ReceiveWithin(xvector<octet_t>& message, std::chrono::milliseconds) { return Receive(message); }
+  // The same of what has come already: who sends faster than it is received does not keep the receiver.
+  virtual bool ReceiveArrived(xvector<octet_t>& message) { return Receive(message); }
   // Whether messages can still come or go.
   virtual bool IsOpen() const { return true; }
+  // False where the other side works in this thread only, and cannot while a call waits here.
+  virtual bool CanAnswer() const { return true; }
 };
 
 // Two ends of a queue in each direction, for one thread.
@@ -69,5 +85,12 @@ constexpr std::size_t kMessageLimit = std::size_t(64) << 20;
 
 // RemoteError for a message that is too long.
 void CheckMessageSize(std::size_t size, std::size_t limit);
+xstring TooLongText(std::size_t size, std::size_t limit);
+
+// So long from now. Any time may be given; what is over a century is one.
+inline std::chrono::steady_clock::time_point EndOf(std::chrono::milliseconds time) {
+  typedef std::chrono::milliseconds Time;
+  return std::chrono::steady_clock::now() + std::clamp<Time>(time, Time(0), std::chrono::hours(24 * 365 * 100));
+}
 
 }  // namespace vesk

@@ -81,7 +81,8 @@ class ClientConnection {
  private:
   struct Pending;  // a call under way
 
-  void Dispatch(xvector<octet_t> const& message);
+  bool DispatchWithin(std::chrono::milliseconds time);
+  void Dispatch(xvector<octet_t> message, std::string error);
   static void ReadAnswer(InputArchive& ar, Pending& pending);
 
   Channel& m_channel;
@@ -155,6 +156,8 @@ class Dispatcher {
   void operator=(Dispatcher const&) = delete;
 
   virtual void SetDelegate(AnyInterface delegate) = 0;
+  // RemoteError for one that is not there.
+  void CheckMethod(ssize_t method) const;
   // The values that go back. A call may lead to another one of the same object.
   Archive Call(void* self, ssize_t method, InputArchive arguments);
 
@@ -252,6 +255,9 @@ void UnregisterScion(ConstStringZ name);
 template <typename Factory>
 Factory& FactoryOf(ConstStringZ name);
 
+// What became of a message. `NoCall`: it led to no method.
+enum class EServed { Nothing, Carried, NoCall, NotAnswered };
+
 // The objects that the other side may call, by number. A number is not given out again.
 class Server {
  public:
@@ -272,7 +278,7 @@ class Server {
   bool Unexport(uint32 number);
 
   void SetMessageLimit(std::size_t bytes) { m_messageLimit = bytes; }
-  // Is told each error, also those that go back to a caller.
+  // Is told each error, also those that go back to a caller. What it throws is dropped.
   void OnError(ErrorFunction function);
 
   // Carries out what waits in the channel. What a method throws, a bad message and a client that is gone do not come
@@ -280,6 +286,8 @@ class Server {
   void Serve() { ServeWithin(std::chrono::milliseconds(0)); }
   // The same, and waits for the first message up to `time`. False once the channel is closed.
   bool ServeWithin(std::chrono::milliseconds time);
+  // Carries out one message that has come already, for who serves many clients in turn.
+  EServed ServeNext();
 
  private:
   struct Exported {
@@ -291,10 +299,16 @@ class Server {
   uint32 ExportScion(ConstStringZ name, AnyInterface object);
   uint32 Add(Exported exported, AnyInterface object);
 
-  void Dispatch(xvector<octet_t> const& message);
-  Archive Carry(xvector<octet_t> const& message, uint32& answer);
-  Archive ErrorReply(uint32 answer, xstring const& text);
-  void Report(std::string const& text) const;
+  struct Call {
+    uint32 m_answer = 0;
+    bool m_isCall = false;  // there is such an object and method
+  };
+  EServed Dispatch(xvector<octet_t> message);
+  Archive Carry(xvector<octet_t> message, Call& call);
+  void SendValues(uint32 answer, Archive const& results);
+  void SendError(uint32 answer, std::string_view text);
+  EServed AnswerError(Call const& call, ConstStringZ text);
+  void Report(ConstStringZ text) const;
 
   Channel& m_channel;
   std::size_t m_messageLimit = kMessageLimit;

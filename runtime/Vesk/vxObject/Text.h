@@ -4,6 +4,7 @@
 @import "Vesk/vxObject/Platform.h"
 
 #include <algorithm>
+#include <atomic>
 #include <charconv>
 #include <cstring>
 #include <iostream>
@@ -32,7 +33,8 @@ using vesk::xstring;
 }  // namespace unqualified
 
 // Writes to a std::ostream, or without one into memory. What is written into memory without an indentation is put where
-// there is room for it at once; all else, and where there is none, goes the long way.
+// there is room for it at once; all else, and where there is none, goes the long way. With a target each insertion is
+// one write to it, and what is kept besides is atomic: threads may share the stream as far as they may its target.
 class xostream {
  public:
   explicit xostream(std::ostream& target) : m_target(&target) {}
@@ -65,7 +67,11 @@ class xostream {
 
   void ChangeIndent(int by) {
     TakeRoom();
-    m_indent += by;
+    if (m_target) {
+      m_indent.fetch_add(by, std::memory_order_relaxed);
+    } else {
+      m_indent.store(Indent() + by, std::memory_order_relaxed);
+    }
     OfferRoom();
   }
 
@@ -103,32 +109,43 @@ class xostream {
 
   // The room is m_text behind m_size, as long as it is offered.
   void OfferRoom() {
-    if (m_target || m_indent != 0 || !m_text) return;
+    if (m_target || Indent() != 0 || !m_text) return;
     m_at = m_text + m_size;
     m_end = m_text + m_capacity;
   }
   void TakeRoom() {
     if (!m_end) return;
     const std::size_t size = static_cast<std::size_t>(m_at - m_text);
-    if (size != m_size) m_atLineStart = m_text[size - 1] == '\n';
+    if (size != m_size) SetAtLineStart(m_text[size - 1] == '\n');
     m_size = size;
     m_at = m_end = nullptr;
   }
 
+  int Indent() const { return m_indent.load(std::memory_order_relaxed); }
+  void SetAtLineStart(bool is) { m_atLineStart.store(is, std::memory_order_relaxed); }
+
+  // Some text.
   void WriteLines(std::string_view text) {
     TakeRoom();
-    while (!text.empty()) {
-      const std::size_t end = text.find('\n');
-      const std::string_view line = text.substr(0, end);
-      if (m_atLineStart && !line.empty()) Append(std::string(m_indent, ' '));
-      Append(line);
-      m_atLineStart = m_atLineStart && line.empty();
-      if (end == std::string_view::npos) break;
-      Append("\n");
-      m_atLineStart = true;
-      text.remove_prefix(end + 1);
+    const int indent = Indent();
+    if (indent == 0) {
+      Append(text);
+    } else {
+      Append(IndentedText(text, indent > 0 ? static_cast<std::size_t>(indent) : 0));
     }
+    SetAtLineStart(text.back() == '\n');
     OfferRoom();
+  }
+  // Empty lines stay empty.
+  std::string IndentedText(std::string_view text, std::size_t indent) const {
+    std::string lines;
+    bool atLineStart = m_atLineStart.load(std::memory_order_relaxed);
+    for (const char c : text) {
+      if (atLineStart && c != '\n') lines.append(indent, ' ');
+      lines += c;
+      atLineStart = c == '\n';
+    }
+    return lines;
   }
   void Append(std::string_view text) {
     if (m_target) {
@@ -157,8 +174,8 @@ class xostream {
   char* m_text = nullptr;
   std::size_t m_size = 0;
   std::size_t m_capacity = 0;
-  int m_indent = 0;
-  bool m_atLineStart = true;
+  std::atomic<int> m_indent{0};
+  std::atomic<bool> m_atLineStart{true};
 };
 
 // Lines written while it lives are indented and stand in braces.

@@ -21,9 +21,16 @@ bool LocalChannel::End::Receive(xvector<octet_t>& message) {
   return true;
 }
 
-void CheckMessageSize(std::size_t size, std::size_t limit) {
-  if (size > limit) throw RemoteError(vxMakeString("message of " << size << " bytes, the limit is " << limit));
+xstring TooLongText(std::size_t size, std::size_t limit) {
+  return vxMakeString("message of " << size << " bytes, the limit is " << limit);
 }
+
+void CheckMessageSize(std::size_t size, std::size_t limit) {
+  if (size > limit) throw RemoteError(TooLongText(size, limit));
+}
+
+MessageTooLong::MessageTooLong(std::size_t size, std::size_t limit, xvector<octet_t> head)
+    : RemoteError(TooLongText(size, limit)), m_head(std::move(head)) {}
 
 // --- Client
 
@@ -55,36 +62,54 @@ void ClientConnection::Send(Archive const& message) {
 
 void ClientConnection::Call(Archive const& message, uint32 answer, PendingResponse& response) {
   Pending pending(*this, answer, response);
+  if (!m_serve && !m_channel.CanAnswer()) throw RemoteError("the object is served by the thread that calls it");
   Send(message);
   if (m_serve) m_serve();
-  const auto end = std::chrono::steady_clock::now() + m_timeout;
-  xvector<octet_t> bytes;
+  const auto end = EndOf(m_timeout);
   while (!pending.m_isDone) {
     const auto left = std::chrono::duration_cast<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
-    if (!m_channel.ReceiveWithin(bytes, std::max(left, std::chrono::milliseconds(0)))) {
+    if (!DispatchWithin(left)) {
       if (!m_channel.IsOpen()) throw ChannelClosed("the other side is gone");
       throw RemoteTimeout("remote call without an answer");
     }
-    Dispatch(bytes);
   }
   if (!pending.m_error.empty()) throw RemoteError(pending.m_error);
 }
 
-// An answer that nobody waits for any more is dropped.
-void ClientConnection::Dispatch(xvector<octet_t> const& message) {
-  CheckMessageSize(message.size(), m_messageLimit);
+// Waits for an answer, of whatever call.
+bool ClientConnection::DispatchWithin(std::chrono::milliseconds time) {
+  xvector<octet_t> message;
+  try {
+    if (!m_channel.ReceiveWithin(message, std::max(time, std::chrono::milliseconds(0)))) return false;
+  } catch (MessageTooLong const& error) {
+    Dispatch(error.Head(), error.what());
+    return true;
+  }
+  const std::size_t size = message.size();
+  Dispatch(std::move(message), size > m_messageLimit ? TooLongText(size, m_messageLimit) : xstring());
+  return true;
+}
+
+// An answer that nobody waits for any more is dropped. `error`: why its values cannot be read.
+void ClientConnection::Dispatch(xvector<octet_t> message, std::string error) {
   if (message.empty()) throw RemoteError("empty message");
-  InputArchive ar(message);
+  InputArchive ar(std::move(message));
   uint32 answer;
-  DeserialiseVariableLengthUint(ar, answer);
+  try {
+    DeserialiseVariableLengthUint(ar, answer);
+  } catch (ArchiveError const& e) {
+    throw RemoteError(std::string("bad answer: ") + e.what());
+  }
   const auto at = std::find_if(m_pending.begin(), m_pending.end(), [=](Pending* p) { return p->m_answer == answer; });
   if (at == m_pending.end()) return;
   Pending& pending = **at;
   pending.m_isDone = true;
+  pending.m_error = std::move(error);
+  if (!pending.m_error.empty()) return;
   try {
     ReadAnswer(ar, pending);
-  } catch (std::exception const& error) {
-    pending.m_error = std::string("bad answer: ") + error.what();
+  } catch (std::exception const& e) {
+    pending.m_error = std::string("bad answer: ") + e.what();
   }
 }
 
@@ -154,11 +179,15 @@ struct Dispatcher::Scope {
 };
 
 Archive Dispatcher::Call(void* self, ssize_t method, InputArchive arguments) {
-  if (method < 0 || method >= m_count) throw RemoteError("no such remote method");
+  CheckMethod(method);
   const Scope scope(*this, std::move(arguments));
   m_thunks[method](self);
   CheckArgumentsRead();
   return std::move(m_results);
+}
+
+void Dispatcher::CheckMethod(ssize_t method) const {
+  if (method < 0 || method >= m_count) throw RemoteError("no such remote method");
 }
 
 void Dispatcher::CheckArgumentsRead() const {
@@ -214,60 +243,107 @@ void Server::OnError(ErrorFunction function) { m_onError = std::move(function); 
 bool Server::ServeWithin(std::chrono::milliseconds time) {
   try {
     xvector<octet_t> message;
-    if (!(time.count() > 0 ? m_channel.ReceiveWithin(message, time) : m_channel.Receive(message))) {
-      return m_channel.IsOpen();
-    }
-    do Dispatch(message);
-    while (m_channel.Receive(message));
+    bool has = time.count() > 0 ? m_channel.ReceiveWithin(message, time) : m_channel.Receive(message);
+    while (has && Dispatch(std::move(message)) != EServed::NotAnswered) has = m_channel.ReceiveArrived(message);
   } catch (std::exception const& error) {
     Report(error.what());
   }
   return m_channel.IsOpen();
 }
 
-// Throws only where the answer cannot be sent.
-void Server::Dispatch(xvector<octet_t> const& message) {
-  uint32 answer = 0;
-  Archive reply;
+EServed Server::ServeNext() {
   try {
-    const Archive results = Carry(message, answer);
-    if (!answer) return;
-    SerialiseVariableLengthUint(reply, answer);
-    reply << octet_t(AN_VALUES);
-    reply.Write(results.m_bytes.data(), results.m_bytes.size());
-    CheckMessageSize(reply.m_bytes.size(), m_messageLimit);
+    xvector<octet_t> message;
+    return m_channel.ReceiveArrived(message) ? Dispatch(std::move(message)) : EServed::Nothing;
   } catch (std::exception const& error) {
-    reply = ErrorReply(answer, error.what());
-  } catch (...) {
-    reply = ErrorReply(answer, "remote method failed");
+    Report(error.what());
+    return EServed::NotAnswered;
   }
-  if (answer) m_channel.Send(reply.m_bytes);
 }
 
-Archive Server::Carry(xvector<octet_t> const& message, uint32& answer) {
-  InputArchive ar(message);
-  uint32 object, method, number;
+// Throws nothing.
+EServed Server::Dispatch(xvector<octet_t> message) {
+  Call call;
+  Archive results;
+  try {
+    results = Carry(std::move(message), call);
+  } catch (std::exception const& error) {
+    return AnswerError(call, error.what());
+  } catch (...) {
+    return AnswerError(call, "remote method failed");
+  }
+  if (!call.m_answer) return EServed::Carried;
+  try {
+    SendValues(call.m_answer, results);
+    return EServed::Carried;
+  } catch (ChannelClosed const& error) {
+    Report(error.what());
+    return EServed::NotAnswered;
+  } catch (std::exception const& error) {
+    return AnswerError(call, error.what());
+  }
+}
+
+Archive Server::Carry(xvector<octet_t> message, Call& call) {
+  const std::size_t size = message.size();
+  InputArchive ar(std::move(message));
+  uint32 object, method, answer;
   DeserialiseVariableLengthUint(ar, object);
   DeserialiseVariableLengthUint(ar, method);
-  DeserialiseVariableLengthUint(ar, number);
-  answer = number;
-  CheckMessageSize(message.size(), m_messageLimit);
+  DeserialiseVariableLengthUint(ar, answer);
+  call.m_answer = answer;
+  CheckMessageSize(size, m_messageLimit);
   const auto at = m_objects.find(object);
   if (at == m_objects.end()) throw RemoteError("no such remote object");
   const Exported exported = at->second;
+  exported.m_dispatcher->CheckMethod(method);
+  call.m_isCall = true;
   return exported.m_dispatcher->Call(exported.m_self, method, std::move(ar));
 }
 
-Archive Server::ErrorReply(uint32 answer, xstring const& text) {
-  Report(text);
+void Server::SendValues(uint32 answer, Archive const& results) {
   Archive reply;
   SerialiseVariableLengthUint(reply, answer);
-  reply << octet_t(AN_ERROR) << text;
-  return reply;
+  reply << octet_t(AN_VALUES);
+  reply.Write(results.m_bytes.data(), results.m_bytes.size());
+  CheckMessageSize(reply.m_bytes.size(), m_messageLimit);
+  m_channel.Send(reply.m_bytes);
 }
 
-void Server::Report(std::string const& text) const {
-  if (m_onError) m_onError(text);
+// So much of the text as the limit leaves room for.
+void Server::SendError(uint32 answer, std::string_view text) {
+  Archive reply;
+  SerialiseVariableLengthUint(reply, answer);
+  reply << octet_t(AN_ERROR);
+  const std::size_t head = reply.m_bytes.size() + 5;  // with the text's length
+  std::size_t size = std::min(text.size(), m_messageLimit > head ? m_messageLimit - head : 0);
+  while (size > 0 && size < text.size() && (text[size] & 0xC0) == 0x80) --size;  // within a character of UTF-8
+  reply << xstring(std::string(text.substr(0, size)));
+  m_channel.Send(reply.m_bytes);
+}
+
+// Throws nothing. Where the text cannot be sent (the channel's limit may be a smaller one), that there was an error is.
+EServed Server::AnswerError(Call const& call, ConstStringZ text) {
+  Report(text);
+  const EServed served = call.m_isCall ? EServed::Carried : EServed::NoCall;
+  if (!call.m_answer) return served;
+  for (std::string_view part : {std::string_view(text), std::string_view()}) {
+    try {
+      SendError(call.m_answer, part);
+      return served;
+    } catch (std::exception const& error) {
+      Report(error.what());
+    }
+  }
+  return EServed::NotAnswered;
+}
+
+// Throws nothing: nobody is there for what the function throws.
+void Server::Report(ConstStringZ text) const {
+  try {
+    if (m_onError) m_onError(text);
+  } catch (...) {
+  }
 }
 
 }  // namespace vesk

@@ -161,8 +161,33 @@ void CheckRemoteMessages()
     const vesk::ptr<ICalc> far(stub->Interface());
     vesk::xvector<int32> in(24, 1), out;
     CHECK(ErrorOf([&] { far->Vectors(in, out); }), "message of 103 bytes, the limit is 100");
+    // An error's text is cut to the limit, between characters.
+    calc.onSwap = [](vesk::string8& a) { throw std::runtime_error(a + vesk::string8(1000, 'x')); };
+    int32 n = 0;
+    for (vesk::string8 text : {"", "a", "ab\xC3\xA9"})
+    {
+        const vesk::xstring begin = text;
+        const vesk::xstring error = ErrorOf([&] { far->Swap(text, n); });
+        CHECK(error, begin + vesk::xstring(93 - begin.size(), 'x'));
+    }
+    calc.onSwap = [](vesk::string8&) { throw std::runtime_error(vesk::string8(92, 'x') + "\xC3\xA9 and more"); };
+    vesk::string8 text;
+    CHECK(ErrorOf([&] { far->Swap(text, n); }), vesk::xstring(92, 'x'));
+    wire.server.SetMessageLimit(0);
+    CHECK(ErrorOf([&] { far->Swap(text, n); }), "remote call failed");
+    wire.server.SetMessageLimit(100);
+
+    // An answer that is too long for the client is the error of the call that it belongs to, and of no other one.
     wire.client.SetMessageLimit(20);
     CHECK(ErrorOf([&] { far->Vectors(in, out); }), "message of 100 bytes, the limit is 20");
+    wire.channel.Server().Send(Bytes(30, 1));
+    CHECK(ErrorOf([&] { far->Vectors({}, out); }), "none");
+    wire.channel.Server().Send({255});
+    CHECK(ErrorOf([&] { far->Vectors({}, out); }), "bad answer: read beyond the end of an archive");
+
+    // What the error function throws stays in the server.
+    wire.server.OnError([](std::string const&) { throw 1; });
+    CHECK(ErrorOf([&] { far->Swap(text, n); }), "message of 95 bytes, the limit is 20");
 }
 
 void CheckRemoteAnswers()

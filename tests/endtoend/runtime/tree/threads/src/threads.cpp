@@ -1,5 +1,5 @@
-// A graph, a heap, archives, a connection and values by name in each of several threads at once. Prints what the threads
-// come to.
+// A graph, a heap, archives, a connection and values by name in each of several threads at once, which print as well.
+// Prints what the threads come to.
 @import "Vesk/vxObject/IObject.h"
 @import "Vesk/vxObject/Json.h"
 
@@ -98,8 +98,16 @@ int main()
     Register_Project_threads();
     int results[4];
     std::thread threads[4];
-    for (int i = 0; i < 4; ++i) threads[i] = std::thread([&results, i] { results[i] = Work(20); });
+    auto work = [](int& result) {
+        vesk::xostream& os = vesk::xout();
+        for (int i = 0; i < 20; ++i) os << "a line\n";
+        os.ChangeIndent(4);
+        result = Work(20);
+        os.ChangeIndent(-4);
+    };
+    for (int i = 0; i < 4; ++i) threads[i] = std::thread(work, std::ref(results[i]));
     for (std::thread& thread : threads) thread.join();
+    vesk::xout() << "flush left\n";
     for (int result : results) std::printf("%d ", result - Work(20));
     std::printf("%d\n", int(vesk::ObjectHeap::Get().Count()));
 }
