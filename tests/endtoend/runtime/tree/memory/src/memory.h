@@ -52,4 +52,5 @@ struct Scenario
     void (*run)(Faults&);
 };
 
+vesk::xvector<Scenario> GraphScenarios();
 vesk::xvector<Scenario> ContainerScenarios();
