@@ -4,6 +4,7 @@
 #include <set>
 
 #include "build/run_command.h"
+#include "build/tool_names.h"
 #include "build/tools.h"
 #include "text/files.h"
 #include "text/numbers.h"
@@ -77,22 +78,55 @@ std::string VisualLinkerText(const ProjectBuilder& builder, const std::vector<st
   return text;
 }
 
+// The names that stand in double quotes in the linker switches: libraries, unless they are switches or, with a `$`,
+// left to make files.
+std::vector<std::string> QuotedLibraries(const ProjectConfig& config) {
+  std::vector<std::string> libraries;
+  for (const std::string& token : LinkerTokens(config.linkerText)) {
+    if (!IsQuoted(token)) continue;
+    std::string name = ForConfiguration(Unquoted(token), config);
+    const bool isSwitch = name.starts_with('-') && !name.starts_with("-l");
+    if (!isSwitch && name.find('$') == std::string::npos) libraries.push_back(std::move(name));
+  }
+  return libraries;
+}
+
+// A static library leaves the libraries that it names to what it is linked into.
+std::vector<std::string> LibrariesOfSubprojects(const ProjectBuilder& builder) {
+  std::vector<std::string> libraries;
+  if (builder.project.targetType == TargetType::StaticLibrary) return libraries;
+  const GccLibraries subprojects(builder.project);
+  for (const Project* subproject : subprojects.Order()) {
+    if (subproject->targetType != TargetType::StaticLibrary) continue;
+    const ProjectConfig* config = subproject->FindConfig(builder.config.name, builder.config.platform);
+    if (!config) continue;
+    const std::vector<std::string> named = QuotedLibraries(*config);
+    libraries.insert(libraries.end(), named.begin(), named.end());
+  }
+  return libraries;
+}
+
 std::string GccLinkerText(const ProjectBuilder& builder, const std::string& target,
                           const std::vector<std::string>& inputs) {
   std::string text;
   if (builder.project.targetType != TargetType::StaticLibrary) {
-    text += "-o \"" + target + "\"";
+    text += "-o " + QuotedInput(builder.settings, target);
     if (builder.project.targetType == TargetType::DynamicLinkLibrary) {
-      text += " -shared \"-Wl,-soname," + std::string(FileNameOf(target)) + "\"";
+      const std::string name(FileNameOf(target));
+      const bool isOneWord = name.find(',') == std::string::npos;  // a comma would end it behind -Wl
+      text += " -shared " + (isOneWord ? Quoted(builder.settings, "-Wl,-soname," + name)
+                                       : "-Xlinker -soname -Xlinker " + Quoted(builder.settings, name));
     }
   }
-  for (const std::string& input : inputs) text += " \"" + input + "\"";
+  for (const std::string& input : inputs) text += " " + QuotedInput(builder.settings, input);
   if (builder.project.targetType == TargetType::StaticLibrary) return text;
-  std::string libraryDirectory;
-  if (FullPathOf(builder.LibraryDirectory(), libraryDirectory)) {
-    text += " -Xlinker -rpath -Xlinker \"" + libraryDirectory + "\"";  // a comma would end the path behind -Wl
+  for (const std::string& library : LibrariesOfSubprojects(builder)) text += " \"" + library + "\"";
+  text += " -Xlinker -rpath -Xlinker '$ORIGIN'";  // the targets of a configuration share a folder, wherever it is moved
+  for (const std::string& token : LinkerTokens(builder.config.linkerText)) {
+    std::string word = ForConfiguration(token, builder.config);
+    ReplaceAllInPlace(word, "$$", "$");  // as make reads it, for which the switches are written as well
+    text += " " + word;
   }
-  for (const std::string& token : LinkerTokens(builder.config.linkerText)) text += " " + token;
   return text;
 }
 
@@ -101,7 +135,8 @@ std::string LinkCommand(const ProjectBuilder& builder, const std::string& target
   const Compiler& compiler = CompilerOf(builder.settings.compiler);
   if (!isStatic) return std::string(compiler.link);
   const std::string command(compiler.archive);
-  return compiler.family == CompilerFamily::Gcc ? command + " \"" + target + "\"" : command;
+  if (compiler.family != CompilerFamily::Gcc) return command;
+  return command + " \"" + AsInput(builder.settings, target) + "\"";
 }
 
 }  // namespace
@@ -135,6 +170,14 @@ std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   return inputs;
 }
 
+std::vector<std::string> LibrariesOfSwitches(const ProjectBuilder& builder) {
+  if (!IsGccFamily(builder.settings.compiler) || builder.project.targetType == TargetType::StaticLibrary) return {};
+  std::vector<std::string> libraries = LibrariesOfSubprojects(builder);
+  const std::vector<std::string> own = QuotedLibraries(builder.config);
+  libraries.insert(libraries.end(), own.begin(), own.end());
+  return libraries;
+}
+
 namespace {
 
 // What is not marked `qrex` is built by others; a link that fails may do so for want of it.
@@ -151,9 +194,35 @@ void HintAtUnbuiltLibraries(const ProjectBuilder& builder) {
 
 }  // namespace
 
+namespace {
+
+std::string LinkerResponseFile(const ProjectBuilder& builder) {
+  return builder.IntermediateDirectory() + "/linker.rsp";
+}
+std::string ManifestResponseFile(const ProjectBuilder& builder) { return builder.IntermediateDirectory() + "/mt.rsp"; }
+std::string ManifestBatchFile(const ProjectBuilder& builder) { return builder.IntermediateDirectory() + "/mtdep.bat"; }
+
+}  // namespace
+
+// A target without its manifest must not pass for a good one.
+bool MakeTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
+  try {
+    ToolOutputs outputs(builder.settings, {target},
+                        {LinkerResponseFile(builder), ManifestResponseFile(builder), ManifestBatchFile(builder)});
+    if (!LinkTarget(builder, target, inputs)) return false;
+    if (CompilerOf(builder.settings.compiler).embedsManifest && !EmbedManifest(builder)) return false;
+    return outputs.Keep();
+  } catch (const FileException& exception) {
+    TraceWriter() << "Error: " << exception << "\n";
+  }
+  ++builder.errorCount;
+  return false;
+}
+
 bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
-  const std::string responseFile = builder.IntermediateDirectory() + "/linker.rsp";
+  const std::string responseFile = LinkerResponseFile(builder);
   const bool isGcc = IsGccFamily(builder.settings.compiler);
+  if (!ToolsTake(builder, {target, responseFile})) return false;
   const std::string text = isGcc ? GccLinkerText(builder, target, inputs) : VisualLinkerText(builder, inputs);
   int returnCode = 0;
   bool linked = false;
@@ -166,7 +235,8 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
     CommandOptions options;
     options.echo = builder.settings.diagnostics;
     options.failOnNonZero = true;
-    linked = RunCommand(LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode, options);
+    linked = RunCommand(builder.settings.tools, LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode,
+                        options);
     if (!linked) TraceWriter() << responseFile << ": " << text << "\n";
   } catch (const FileException&) {
     TraceWriter() << "Error writing " << text << " - linking failed\n";
@@ -174,7 +244,6 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   if (linked) return true;
   HintAtUnbuiltLibraries(builder);
   ++builder.errorCount;
-  if (isGcc || IsAbnormalEnd(returnCode)) DeleteThoughReadOnly(target);  // half a target must not pass for a good one
   return false;
 }
 
@@ -187,7 +256,7 @@ bool RunManifestCommand(const ProjectBuilder& builder, const std::string& comman
   options.echo = builder.settings.diagnostics;
   options.failOnNonZero = true;
   int returnCode;
-  return RunCommand(command, returnCode, options);
+  return RunCommand(builder.settings.tools, command, returnCode, options);
 }
 
 bool UpdateManifest(const ProjectBuilder& builder) {
@@ -201,7 +270,7 @@ bool UpdateManifest(const ProjectBuilder& builder) {
   const std::string text = "/outputresource:\"" + builder.LibraryDirectory() + "/" + name + "\";#" +
                            std::string(resource) + " /manifest \"./" + directory + "/" + name +
                            ".intermediate.manifest\"\n";
-  const CommandFile response(builder.settings.leftovers, directory + "/mt.rsp", text);
+  const CommandFile response(builder.settings.leftovers, ManifestResponseFile(builder), text);
   if (builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
   return RunManifestCommand(builder, "mt.exe @\"" + response.Path() + "\" /nologo");
 }
@@ -210,7 +279,7 @@ bool UpdateManifest(const ProjectBuilder& builder) {
 bool MarkManifestTime(const ProjectBuilder& builder) {
   std::string directory;
   ReplaceChar(builder.IntermediateDirectory(), directory, '/', '\\');
-  const CommandFile batch(builder.settings.leftovers, builder.IntermediateDirectory() + "/mtdep.bat",
+  const CommandFile batch(builder.settings.leftovers, ManifestBatchFile(builder),
                           "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
   return RunManifestCommand(builder, "\"" + directory + "\\mtdep.bat\"");
 }

@@ -202,15 +202,12 @@ bool ProjectBuilder::LinkIfStale() {
     const auto known = m_objectTimes.find(input);
     return known == m_objectTimes.end() ? LastWriteTime(input) : known->second;
   };
-  const bool isCurrent = targetTime != 0 && std::none_of(inputs.begin(), inputs.end(), [&](const std::string& input) {
+  std::vector<std::string> watched = LibrariesOfSwitches(*this);
+  watched.insert(watched.end(), inputs.begin(), inputs.end());
+  const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), [&](const std::string& input) {
                            return timeOf(input) > targetTime;
                          });
-  if (isCurrent) return true;
-  if (!LinkTarget(*this, target, inputs)) return false;
-  if (!CompilerOf(settings.compiler).embedsManifest) return true;
-  if (EmbedManifest(*this)) return true;
-  DeleteThoughReadOnly(target);  // a target without its manifest must not pass for a good one
-  return false;
+  return isCurrent || MakeTarget(*this, target, inputs);
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.

@@ -77,16 +77,17 @@ bool IsAbnormalEnd(int returnCode) {
          (returnCode > kEndedBySignal && returnCode <= kEndedBySignal + kLastSignal);
 }
 
-bool RunCommand(const std::string& command, int& returnCode, const CommandOptions& options) {
+bool RunCommand(platform::ToolKeeper& tools, const std::string& command, int& returnCode,
+                const CommandOptions& options) {
   std::string line = command;
   if (options.output) {
     line += std::string(" 1>") + kOutputFile;
-    DeleteFile(kOutputFile);  // what an earlier run may have left is not this tool's
+    DeleteThoughReadOnly(kOutputFile);  // what an earlier run may have left is not this tool's
   }
   if (options.errorsIntoOutput) line += " 2>&1";
   if (options.errors) {
     line += std::string(" 2>") + kErrorFile;
-    DeleteFile(kErrorFile);
+    DeleteThoughReadOnly(kErrorFile);
   }
   if (options.echo) TraceWriter() << line << "\n";
   auto fail = [&](std::string_view message) {
@@ -95,7 +96,7 @@ bool RunCommand(const std::string& command, int& returnCode, const CommandOption
     return false;
   };
 
-  returnCode = platform::RunCommand(line);
+  returnCode = platform::RunCommand(tools, line);
   if (returnCode == -1) {
     const int error = errno;
     fail("");
@@ -118,11 +119,30 @@ bool RunCommand(const std::string& command, int& returnCode, const CommandOption
   return true;
 }
 
-CommandFile::CommandFile(LeftoverSweep& leftovers, std::string path, std::string_view text) : m_path(std::move(path)) {
-  leftovers.Beside(m_path);
-  ReplaceFile(m_path, WithCarriageReturns(text));
+ToolOutputs::ToolOutputs(const ConfigSettings& settings, std::vector<std::string> outputs,
+                         std::vector<std::string> passing)
+    : m_settings(settings), m_outputs(std::move(outputs)), m_noted(std::move(passing)) {
+  m_noted.insert(m_noted.end(), {kOutputFile, kErrorFile});
+  m_noted.insert(m_noted.end(), m_outputs.begin(), m_outputs.end());
+  m_settings.outputNotes.Add(m_settings.leftovers, m_noted);
 }
 
-CommandFile::~CommandFile() { DeleteFile(m_path); }
+ToolOutputs::~ToolOutputs() {
+  bool areLeft = false;
+  if (!m_areWhole) {
+    for (const std::string& output : m_outputs) {
+      DeleteThoughReadOnly(output);
+      areLeft = areLeft || LastWriteTime(output) != 0;
+    }
+  }
+  if (!areLeft) m_settings.outputNotes.Remove(m_noted);
+}
+
+CommandFile::CommandFile(LeftoverSweep& leftovers, std::string path, std::string_view text) : m_path(std::move(path)) {
+  leftovers.Beside(m_path);
+  ReplaceFile(m_path, WithCarriageReturns(text), ReadOnlyTarget::Replace);
+}
+
+CommandFile::~CommandFile() { DeleteThoughReadOnly(m_path); }
 
 }  // namespace qrex

@@ -26,14 +26,15 @@ int64_t TargetTime(ProjectBuilder& builder, ScannedFile& file) {
 
 }  // namespace
 
-int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file) {
+int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer) {
   if (file.latestTargetTime != 0) return file.latestTargetTime;
   file.latestTargetTime = TargetTime(builder, file);
   if (file.latestTargetTime == 0) {
-    throw LexScannerException("Error - file not translated by qrex : " + file.file.path, nullptr);
+    throw LexScannerException("Error - file not translated by qrex : " + file.file.path, nullptr)
+        .WithHint(importer ? importer->UseHint(file) : std::string());
   }
   for (ScannedFile* import : file.imports) {
-    file.latestTargetTime = std::max(file.latestTargetTime, LatestTargetTime(builder, *import));
+    file.latestTargetTime = std::max(file.latestTargetTime, LatestTargetTime(builder, *import, &file));
   }
   return file.latestTargetTime;
 }

@@ -9,8 +9,8 @@ namespace qrex {
 
 // The latest write time of the file and all that it imports; 0 if one of them is missing. Kept in the ScannedFile.
 int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file);
-// The same over the translated files. Throws "Error - file not translated by qrex : ".
-int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file);
+// The same over the translated files. Throws "Error - file not translated by qrex : ", whose hint tells the importer.
+int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer = nullptr);
 bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file);
 // Notes that a .cpp which was not translated in this run registers the headers of its project that it imports directly.
 void MarkRegistered(ScannedFile& file);

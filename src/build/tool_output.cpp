@@ -21,6 +21,7 @@ bool StripIgnoringCase(std::string& path, const std::string& prefix) {
   return true;
 }
 
+constexpr size_t kLongestPath = 32'767;           // of any system; beyond it stands a line of many messages
 constexpr int64_t kLastLine = 1'000'000'000'000;  // no file is longer; further digits of a number are only passed over
 
 // A message in a line: where the file name ends, the number, and the text behind.
@@ -109,6 +110,7 @@ class OutputScanner {
   }
 
   void PointAtSource(std::string_view indentation, const Message& message) {
+    if (message.file.size() > kLongestPath) return;
     // A compiler tells how it came to a file: from here or not, with `.` and `..` as its include paths have them.
     std::string file(message.file);
     std::replace(file.begin(), file.end(), '\\', '/');

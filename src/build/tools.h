@@ -15,7 +15,9 @@ namespace qrex {
 std::vector<std::string> IncludePaths(const Project& project, const ProjectConfig& config, bool translated);
 // Of the sources, as the compiler sees them.
 std::string CompiledDirectory(const Project& project, const ProjectConfig& config);
-// exportLib/PLATFORM/CONFIG/, then the name with "lib" ahead and its extension behind as the gcc family has them.
+// The name with "lib" ahead and its extension behind as the gcc family has them; the path is below
+// exportLib/PLATFORM/CONFIG/.
+std::string GccTargetName(const Project& project);
 std::string GccTargetPath(const Project& project, const ProjectConfig& config);
 std::string_view GccTargetExtension(TargetType type);  // "a", "so", "???" of a utility project; empty for programs
 
@@ -29,6 +31,11 @@ bool CompileFile(ProjectBuilder& builder, ScannedFile& file);
 bool AssembleFile(ProjectBuilder& builder, ScannedFile& file);
 bool CompileResource(ProjectBuilder& builder, ScannedFile& file);
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder);
+// What the linker switches name as libraries, in the gcc family: the target is stale when one of them is newer, as with
+// an input.
+std::vector<std::string> LibrariesOfSwitches(const ProjectBuilder& builder);
+bool MakeTarget(ProjectBuilder& builder, const std::string& target,
+                const std::vector<std::string>& inputs);  // the two:
 bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs);
 bool EmbedManifest(ProjectBuilder& builder);
 

@@ -70,7 +70,8 @@ void CommandLine::RunParallelBuild() {
   }
   TraceWriter() << "\n" << command << "\n";
   ScopeTimer timer;
-  const int result = platform::RunCommand(command);
+  const int result = platform::RunCommand(m_settings.tools, command);
+  m_settings.tools.Stop();
   if (result != 0) TraceWriter() << command << " failed with error code " << result << "\n";
   timer.Stop();
   timer.Label() << "Parallel build with devenv";

@@ -64,6 +64,7 @@ void ConfigParser::ParseStatement() {
       for (size_t i = 0; i < std::size(kModes); ++i) {
         if (word != kModes[i].word) continue;
         m_settings.mode = static_cast<RunMode>(i);
+        if (!IsAddedText(m_settings.sourceFiles, token.text.begin)) m_settings.fileMode = m_settings.mode;
         return;
       }
     } else if (const auto compiler = FindCompiler(word)) {
@@ -117,6 +118,7 @@ void ConfigParser::ParseVariable() {
     RequireNoQuote(value, previous);
     m_settings.*variable.field = value;
   }
+  if (name == "TARGET_DIR") RequireNoQuote(value, previous);
   if (name == "COMPILE_FILE_PATH") m_settings.compileFilePath = NormalisePath(value);
   if (name == "TARGET_DIR" && !value.empty()) SplitTargetDirectory(NormalisePath(value));
 }

@@ -12,7 +12,7 @@ constexpr size_t kStackSize = size_t{1} << 30;
 int main(int argc, char** argv) {
   int status = 1;
   qrex::platform::FillStandardHandles();
-  qrex::platform::FailWritesBeyondLimit();
+  qrex::platform::SetSignals();
   qrex::platform::TuneHeap();
   qrex::platform::BufferStdout();
   static auto& commandLine = *new qrex::CommandLine({argv, argv + argc});  // left to the end of the process

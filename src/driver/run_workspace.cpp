@@ -6,6 +6,8 @@
 #include <vector>
 
 #include "build/project_builder.h"
+#include "build/tools.h"
+#include "driver/run_hints.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"
 #include "generators/generate.h"
@@ -197,7 +199,9 @@ void WorkspaceRun::GenerateProject(Project& project) {
   if (!project.exported) CreateMissingFiles(project);
   m_generator.WriteProject(project, Form::Plain);
   if (!project.exported) WriteExportedProject(project);
-  if (project.usesQrex) m_generator.WriteProject(project, Form::Translated);
+  if (!project.usesQrex) return;
+  m_generator.WriteProject(project, Form::Translated);
+  TellCopiedSources(project);
 }
 
 void WorkspaceRun::Prepare(const Project& project) {
@@ -239,13 +243,17 @@ void WorkspaceRun::CreateMissingFiles(Project& project) const {
   }
 }
 
-// The built target of a prepackaged project goes to the library directory.
+// The built target of a prepackaged project goes to the library directory: by the name that every compiler looks for
+// and, in the gcc family, by the one that its tools give it.
 void WorkspaceRun::Repackage(const Project& project) const {
   if (!m_settings.repackageExecutableTargets || !project.exported) return;
   if (project.targetType == TargetType::UtilityProject) return;
-  const std::string target = m_settings.platform + "/" + m_settings.config + "/" + project.name + "." +
-                             std::string(TargetTypeExtension(project.targetType));
-  CopyIfNewer(m_settings.leftovers, PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
+  auto copy = [&](const std::string& name) {
+    const std::string target = m_settings.platform + "/" + m_settings.config + "/" + name;
+    CopyIfNewer(m_settings.leftovers, PathJoin(project.rootDir, target), m_settings.exportLib + "/" + target, false);
+  };
+  copy(project.name + "." + std::string(TargetTypeExtension(project.targetType)));
+  if (IsGccFamily(m_settings.compiler)) copy(GccTargetName(project));
 }
 
 namespace {
@@ -295,6 +303,7 @@ bool WorkspaceRun::BuildProject(Project& project) {
       builder.Clean(dependencyFile);
     } else {
       succeeded = builder.Build(dependencyFile, nullptr);
+      TellCopiedSources(project);
     }
     m_errors += builder.errorCount;
     m_warnings += builder.warningCount;
@@ -311,6 +320,7 @@ void WorkspaceRun::GenerateWorkspace() {
   }
   m_generator.WriteWorkspace(m_workspace, Form::Plain);
   if (AnyProjectUsesQrex(m_workspace)) m_generator.WriteWorkspace(m_workspace, Form::Translated);
+  HintAtCallOfMake(m_workspace);
 }
 
 // --- One file
@@ -414,12 +424,19 @@ namespace {
 // Tools of two builds in one folder would write over each other's objects and captured output.
 void WaitForOtherBuilds(platform::FolderLock& folder) {
   if (folder.TryToTake()) return;
-  const uint64_t holder = folder.Holder();
+  uint64_t holder = folder.Holder();
+  if (!platform::IsProcessRunning(holder)) holder = 0;  // killed: what it started is about to end
   TraceWriter() << "Waiting for " << (holder == 0 ? "another process" : "process " + std::to_string(holder))
                 << ", which builds in this folder\n";
   platform::FlushStdout();
   folder.Take();
 }
+
+// The keeper shares the lock: the next build must not find it held any more.
+struct KeeperEnd {
+  platform::ToolKeeper& tools;
+  ~KeeperEnd() { tools.Stop(); }
+};
 
 }  // namespace
 
@@ -429,7 +446,12 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (!CheckPathSyntax(settings)) return false;
   platform::FolderLock folder(".");
   const bool builds = settings.mode == RunMode::Build || settings.mode == RunMode::Compile;
-  if (builds && !settings.translateOnly) WaitForOtherBuilds(folder);
+  const KeeperEnd keeperEnd{settings.tools};
+  if (builds && !settings.translateOnly) {
+    WaitForOtherBuilds(folder);
+    if (!settings.outputNotes.DeleteNoted()) return false;
+    settings.tools.Start();
+  }
   const auto run = std::make_shared<WorkspaceRun>(settings);
   if (loaded) *loaded = run;
   return run->LoadAll() && run->Run(timer);

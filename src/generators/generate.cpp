@@ -20,6 +20,14 @@ std::string MakeFileName(const std::string& name, const ProjectConfig& config) {
   return "make_" + name + "_" + config.platform + "_" + config.name;
 }
 
+bool MakeTakes(Form form, const std::string& makeFile, const std::string& hostileName) {
+  if (hostileName.empty()) return true;
+  if (form == Form::Translated) return false;  // the first pass has said it
+  TraceWriter() << "Error : Make file " << makeFile << " would run parts of the name " << hostileName
+                << " - not written\n";
+  return false;
+}
+
 std::unordered_set<std::string> ProjectMakeFiles(const Workspace& workspace) {
   std::unordered_set<std::string> names;
   for (const auto& project : workspace.projects) {
@@ -52,10 +60,19 @@ void Generator::Generate(const std::string& path, void (*write)(TextWriter&, Arg
 void Generator::WriteGccProject(Project& project) {
   if (!project.exported) {
     for (const auto& config : project.configs) {
-      Generate(MakeFileName(project.name, *config), WriteProjectMakeFile, project, *config);
+      const std::string name = MakeFileName(project.name, *config);
+      if (MakeTakes(m_form, name, NameThatMakeReads(project, *config)))
+        Generate(name, WriteProjectMakeFile, project, *config);
     }
   }
   Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
+}
+
+void Generator::WriteTopMakeFiles(const Workspace& workspace) {
+  const auto& configs = workspace.projects.front()->configs;
+  if (!MakeTakes(m_form, "makefile", configs.empty() ? "" : NameThatMakeReads(workspace, *configs.front()))) return;
+  Generate("makefile", WriteTopMakeFile, workspace);
+  Generate(workspace.name + ".make", WriteTopMakeFile, workspace);
 }
 
 void Generator::WriteGccWorkspace(const Workspace& workspace) {
@@ -67,10 +84,10 @@ void Generator::WriteGccWorkspace(const Workspace& workspace) {
       TraceWriter() << "Error : Make file " << name << " of the workspace has the name of a project's - not written\n";
       continue;
     }
+    if (!MakeTakes(m_form, name, NameThatMakeReads(workspace, *config))) continue;
     Generate(name, WriteWorkspaceMakeFile, workspace, *config);
   }
-  Generate("makefile", WriteTopMakeFile, workspace);
-  Generate(workspace.name + ".make", WriteTopMakeFile, workspace);
+  WriteTopMakeFiles(workspace);
   m_upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies
   Generate(workspace.name + ".workspace", WriteCodeBlocksWorkspace, workspace);
   Generate(workspace.name + ".geany", WriteGeanyProject, workspace);

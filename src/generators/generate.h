@@ -25,6 +25,7 @@ class Generator {
   template <typename... Args>
   void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args);
   void WriteGccProject(Project& project);
+  void WriteTopMakeFiles(const Workspace& workspace);
   void WriteGccWorkspace(const Workspace& workspace);
 
   LeftoverSweep& m_leftovers;

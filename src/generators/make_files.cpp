@@ -1,5 +1,7 @@
 #include "generators/make_files.h"
 
+#include <initializer_list>
+
 #include "build/tools.h"
 #include "generators/common.h"
 #include "text/paths.h"
@@ -73,7 +75,38 @@ void WriteTargetRule(TextWriter& out, const Project& project, std::string_view t
   out << "-o $@ $(OBJS) $(LDFLAGS)\n\n";
 }
 
+// What make or its shell would read as something else than a part of a name. Blanks and `&` are read so too, and stay:
+// the form of these files has them as they are.
+constexpr std::string_view kReadInQuotes = "$`\"\\#\n\r";
+constexpr std::string_view kRead = "$`\"\\#\n\r';|<>()";
+
+// The first name of a list, unless one was found before.
+void FindNameWith(std::string_view characters, std::initializer_list<std::string_view> names, std::string& found) {
+  for (const std::string_view name : names) {
+    if (found.empty() && name.find_first_of(characters) != std::string_view::npos) found = name;
+  }
+}
+
 }  // namespace
+
+std::string NameThatMakeReads(const Project& project, const ProjectConfig& config) {
+  std::string found;
+  FindNameWith(kRead, {GccTargetPath(project, config)}, found);
+  for (const std::string& path : IncludePaths(project, config, project.usesQrex)) {
+    FindNameWith(kReadInQuotes, {path}, found);
+  }
+  const std::string sources = CompiledDirectory(project, config) + "/";
+  for (const ProjectFile* file : CompiledFiles(project)) FindNameWith(kRead, {sources + file->path, file->stem}, found);
+  for (const std::string& path : project.subprojects) FindNameWith(kReadInQuotes, {SubprojectName(path)}, found);
+  return found;
+}
+
+std::string NameThatMakeReads(const Workspace& workspace, const ProjectConfig& config) {
+  std::string found;
+  FindNameWith(kRead, {workspace.name, config.platform, config.name}, found);
+  for (const auto& project : workspace.projects) FindNameWith(kRead, {project->name}, found);
+  return found;
+}
 
 void WriteProjectMakeFile(TextWriter& out, const Project& project, const ProjectConfig& config) {
   const std::string target = GccTargetPath(project, config);

@@ -117,6 +117,15 @@ std::string_view AddedLine(const SourceFileList& files, const char* position) {
 
 }  // namespace
 
+bool IsAddedText(const SourceFileList& files, const char* position) {
+  for (const auto& file : files) {
+    const TextRange expansion{std::string_view(file->expansion)};
+    if (!expansion.Contains(position)) continue;
+    return !AddedLine(files, MapOutputOffset(file->map, position - expansion.begin)).empty();
+  }
+  return false;
+}
+
 void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception) {
   std::string path;
   int64_t line;

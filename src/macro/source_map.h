@@ -80,6 +80,8 @@ using SourceFileList = std::vector<std::unique_ptr<MpfwSourceFile>>;
 bool FindSourceLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
 // The same for a position in the expansion of one of the files.
 bool FindExpandedLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
+// Whether a position in an expansion came of what the command line added to a file.
+bool IsAddedText(const SourceFileList& files, const char* position);
 // With its hint behind it, also on whether the place was added to the file by the command line.
 void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception);
 

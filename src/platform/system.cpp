@@ -3,7 +3,6 @@
 #include <malloc.h>
 #include <pthread.h>
 #include <sys/mman.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -20,6 +19,7 @@
 
 #include "platform/console.h"
 #include "platform/file_system.h"
+#include "platform/tool_keeper.h"
 
 namespace qrex::platform {
 
@@ -151,7 +151,7 @@ std::string ForShell(std::string_view line) {
 
 }  // namespace
 
-int RunCommand(const std::string& line) {
+int RunCommand(ToolKeeper& tools, const std::string& line) {
   constexpr std::string_view kInterpreter = "cmd /c ";
   constexpr std::string_view kCompiler = "gcc-4 ";
   constexpr std::string_view kBatchEnd = ".bat\"";
@@ -163,9 +163,7 @@ int RunCommand(const std::string& line) {
     return RunBatchFile(command.substr(1, command.size() - 2));
   }
   FlushStdout();
-  const int status = std::system(ForShell(command).c_str());
-  if (status == -1) return -1;
-  return WIFEXITED(status) ? WEXITSTATUS(status) : 128 + WTERMSIG(status);
+  return tools.Run(ForShell(command));
 }
 
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
@@ -225,9 +223,9 @@ void RunOnStack(size_t bytes, const std::function<void()>& body) {
   if (run.failure) std::rethrow_exception(run.failure);
 }
 
-// A handler, since tools would inherit that the signal is ignored.
-void FailWritesBeyondLimit() {
-  std::signal(SIGXFSZ, [](int) {});
+void SetSignals() {
+  std::signal(SIGXFSZ, [](int) {});  // a handler, since tools would inherit that the signal is ignored
+  std::signal(SIGCHLD, SIG_DFL);     // who ignores it, also by inheritance, is not told how its tools ended
 }
 
 // The heap begins with a step that holds most runs, in large pages: to be given memory page by page took up to half of

@@ -7,7 +7,9 @@
 
 #include "macro/mpfw_parser.h"
 #include "platform/system.h"
+#include "platform/tool_keeper.h"
 #include "text/files.h"
+#include "text/output_notes.h"
 #include "workspace/compilers.h"
 
 namespace qrex {
@@ -46,8 +48,12 @@ struct ConfigSettings {
   bool modernCpp = false;
   bool compilableText = false;
   RunMode mode = RunMode::Build;
+  RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
-  mutable LeftoverSweep leftovers;  // whoever may read the settings may write files
+  // Whoever may read the settings may write files and run tools.
+  mutable LeftoverSweep leftovers;
+  mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
+  mutable platform::ToolKeeper tools;
 
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };

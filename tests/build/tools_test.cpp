@@ -25,7 +25,7 @@ class ToolsTest : public WorldTest {
          {"cl", "gcc-4", "ml", "ml64", "rc.exe", "link.exe", "lib.exe", "mt.exe", "g++", "clang++", "wineg++", "ar"}) {
       AddTool(tool,
               "echo \"$(basename \"$0\") $*\" >> log\n"
-              "for word; do case $word in @*) cat \"${word#@}\" >> log; echo >> log;; esac; done\n"
+              "for word; do case $word in @*) cat < \"${word#@}\" >> log; echo >> log;; esac; done\n"
               "[ ! -f say ] || cat say\n[ ! -f status ] || exit $(cat status)\n");
     }
   }
@@ -68,18 +68,19 @@ TEST_F(ToolsTest, RunCommandAnswersAsTheOptionsSay) {
   std::string output, errors;
   int code;
   const CommandOptions capture{.output = &output, .errors = &errors};
-  ASSERT_TRUE(RunCommand("cmd /c exit 3", code, {}));
+  ASSERT_TRUE(RunCommand(settings.tools, "cmd /c exit 3", code, {}));
   ASSERT_EQ(3, code);
   ASSERT_EQ("", trace);
   AddTool("both", "printf 'a\\r\\nb'\nprintf oops >&2\n");
-  ASSERT_TRUE(RunCommand("both", code, capture));
+  ASSERT_TRUE(RunCommand(settings.tools, "both", code, capture));
   ASSERT_EQ("a\nb|oops|oops\n", output + "|" + errors + "|" + trace);
   ASSERT_FALSE(FileExists("out1.txt") || FileExists("out2.txt"));
   trace.clear();
-  ASSERT_TRUE(RunCommand("both", code, {.echo = true, .output = &output, .errorsIntoOutput = true}));
+  ASSERT_TRUE(RunCommand(settings.tools, "both", code, {.echo = true, .output = &output, .errorsIntoOutput = true}));
   ASSERT_EQ("a\nboops|both 1>out1.txt 2>&1\n", output + "|" + trace);
   trace.clear();
-  ASSERT_FALSE(RunCommand("both", code, {.output = &output, .errors = &errors, .failOnErrorText = true}));
+  ASSERT_FALSE(
+      RunCommand(settings.tools, "both", code, {.output = &output, .errors = &errors, .failOnErrorText = true}));
   ASSERT_EQ("both 1>out1.txt 2>out2.txt\noops\n", trace);
 }
 
@@ -108,7 +109,7 @@ TEST_F(ToolsTest, CommandsThatFail) {
   for (const auto& [command, options, expected] : cases) {
     int code;
     trace.clear();
-    EXPECT_FALSE(RunCommand(command, code, options)) << command;
+    EXPECT_FALSE(RunCommand(settings.tools, command, code, options)) << command;
     EXPECT_EQ(expected, trace);
   }
 }
@@ -118,7 +119,7 @@ TEST_F(ToolsTest, InterruptedCommandsEndTheRun) {
   std::string output;
   int code;
   ASSERT_EQ("Interrupted while running stopped",
-            MessageOf([&] { RunCommand("cmd /c stopped x", code, {.output = &output}); }));
+            MessageOf([&] { RunCommand(settings.tools, "cmd /c stopped x", code, {.output = &output}); }));
   ASSERT_FALSE(FileExists("out1.txt"));
 }
 
@@ -195,6 +196,44 @@ TEST_F(ToolsTest, AssemblersAndResources) {
       << trace;
 }
 
+// A name is one word of a command line, and a name; where a tool cannot take it so, it is refused.
+TEST_F(ToolsTest, HostileNames) {
+  Project& app = AddApp("Application", "\"x.cpp\" \"y.asm\" \"z.rc\"");
+  const auto kGcc = CompilerKind::gcc, kVisual = CompilerKind::vc9;
+  const struct {
+    CompilerKind compiler;
+    const char* name;
+    const char* platform;
+    const char* said;  // of the call; else the error
+  } cases[] = {
+      {kGcc, "a\\b.cpp", "x64", R"(-o "x64/Debug/app/a\\b.o" "qrexsource/x64/Debug/app/src/a\\b.cpp")"},
+      {kGcc, "a.cpp", "-x", "-o \"./-x/Debug/app/a.o\" \"qrexsource/-x/Debug/app/src/a.cpp\"\n"},
+      {kGcc, "a.cpp", "@x", "-o \"./@x/Debug/app/a.o\" "},
+      {kGcc, "a\nb.cpp", "x64", "app/src/a\nb.cpp : a line ends in it\n"},
+      {kGcc, "a\"b.cpp", "x64", "app/src/a\"b.cpp : a double quote stands in it\n"},
+      {kVisual, "a\\b.cpp", "x64", "app/src/a\\b.cpp : a backslash parts folders there\n"},
+      {kVisual, "a.cpp", "-x", "name -x/Debug/app/a.obj : it would be read as an option\n"},
+  };
+  for (const auto& test : cases) {
+    SCOPED_TRACE(test.said);
+    app.configs.front()->platform = test.platform;
+    Builder(test.compiler);
+    for (ScannedFile* scanned : builder->scanned) {
+      scanned->file.path = PathJoin("app/src", test.name);
+      StemOf(test.name, scanned->file.stem);
+    }
+    ScannedFile &resource = *builder->scanned[0], &source = *builder->scanned[1], &assembled = *builder->scanned[2];
+    if (CompileFile(*builder, source)) {
+      EXPECT_NE(std::string::npos, TakeLog().find(test.said));
+    } else {
+      EXPECT_FALSE(AssembleFile(*builder, assembled) || CompileResource(*builder, resource));
+      EXPECT_EQ(3, builder->errorCount);
+      EXPECT_NE(std::string::npos, trace.find(test.said)) << trace;
+      EXPECT_EQ("", TakeLog());
+    }
+  }
+}
+
 // What a compiler's output and return code make of a file, and of the object that it left.
 TEST_F(ToolsTest, ResultsOfACompiler) {
   AddApp("Application", "\"x.cpp\"");
@@ -209,7 +248,7 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
   } cases[] = {
       {kVisual, "x.cpp\n", "0", true, 0, 0, true},
       {kVisual, "x.cpp(3) : warning C4100: w\n", "2", true, 0, 1, true},
-      {kVisual, "x.cpp(3) : error C1: e\nx.cpp(4) : error C2: e\n", "0", false, 2, 0, true},
+      {kVisual, "x.cpp(3) : error C1: e\nx.cpp(4) : error C2: e\n", "0", false, 2, 0, false},
       {kVisual, "", "127", false, 1, 0, false},
       {kVisual, "x.cpp(3) : error C1: e\n", "139", false, 1, 0, false},
       {kGcc, "", "0", true, 0, 0, true},
@@ -275,6 +314,23 @@ TEST_F(ToolsTest, MessagesAreCounted) {
     EXPECT_EQ(test.errors, builder->errorCount) << test.text;
     EXPECT_EQ(test.warnings, builder->warningCount) << test.text;
     EXPECT_EQ(test.text, trace);
+  }
+}
+
+TEST_F(ToolsTest, ManyMessagesInALineTakeLinearTime) {
+  AddApp("Application", "");
+  constexpr int kMessages = 100'000;
+  const struct {
+    CompilerKind compiler;
+    const char* message;
+  } cases[] = {{CompilerKind::vc9, "qrexsource/x64/Debug/x.cpp(1) : error "},
+               {CompilerKind::gcc, "x.cpp:1:1: error: "}};
+  for (const auto& test : cases) {
+    Builder(test.compiler);
+    std::string text;
+    for (int i = 0; i < kMessages; ++i) text += test.message;
+    EXPECT_FALSE(ScanToolOutput(*builder, text));
+    EXPECT_EQ(kMessages, builder->errorCount);
   }
 }
 
@@ -377,20 +433,19 @@ TEST_F(ToolsTest, FailedLinks) {
 TEST_F(ToolsTest, GccLinks) {
   WriteProject("top", "Static Library", "subproj { \"base\" \"middle\" } { }");
   WriteProject("middle", "Static Library", "subproj { \"base\" } { }");
-  WriteProject("base", "Static Library", "{ }");
+  WriteProject("base", "Static Library", R"(+link { -lno "v/b.a" "-lz" "-Wl,-no" "$@"; "$@" } { })");
   WriteProject("shared", "Dynamic-Link Library", "export subproj { \"hidden\" } { }");
   WriteProject("hidden", "Static Library", "{ }");
   Project& app = AddApp("Application", "\"a.cpp\" \"r.rc\"", "subproj { \"top\" \"shared\" \"base\" }");
-  app.configs.front()->linkerText = " -lm \"-Wl,-z now\"";
-  std::string folder;
-  FullPathOf("lib/x64/Debug", folder);
+  app.configs.front()->linkerText = " -lm \"-Wl,-z now\" \"v/$(Platform).a\" -L$(Configuration)";
   const std::string inputs =
       " \"x64/Debug/app/a.o\" \"lib/x64/Debug/libtop.a\" \"lib/x64/Debug/libmiddle.a\" \"tree/x64/Debug/libshared.so\""
-      " \"lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker \"" +
-      folder + "\" -lm \"-Wl,-z now\"\n";
+      " \"lib/x64/Debug/libbase.a\" \"v/b.a\" \"-lz\" -Xlinker -rpath -Xlinker '$ORIGIN' -lm \"-Wl,-z now\" "
+      "\"v/x64.a\" -LDebug\n";
   Builder(CompilerKind::gcc);
   ASSERT_TRUE(LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder)));
   ASSERT_EQ("g++ @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/app\"" + inputs, TakeLog());
+  ASSERT_EQ((std::vector<std::string>{"v/b.a", "-lz", "v/x64.a"}), LibrariesOfSwitches(*builder));
 
   app.targetType = TargetType::DynamicLinkLibrary;
   for (const auto& [compiler, linker] :

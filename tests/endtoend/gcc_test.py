@@ -102,6 +102,17 @@ def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     equal(workspace.shell(PROGRAM), RESULT)
 
 
+@in_workspace({**FILES, "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -fPIC }\n',  # debug data names the folder
+               "tree/app/src/app.qrpj": FILES["tree/app/src/app.qrpj"].replace(" -Wl,-rpath,out/lib/x64/Debug", "")}, "g++")
+def a_built_tree_moves_and_two_checkouts_are_equal(workspace):
+    workspace.shell("mkdir -p one 'another one/b' && cp -r all.qrex tree one && cp -r all.qrex tree 'another one/b'")
+    for folder in ("one", "another one/b"):
+        holds(workspace.shell(f"cd '{folder}' && Qrex all.qrex"), "\nCompleted....")
+    workspace.shell("diff -r one/out/lib 'another one/b/out/lib'")
+    workspace.shell("mv one/out/lib/x64/Debug moved && rm -r one")
+    equal(workspace.shell("moved/app"), RESULT)
+
+
 @in_workspace(FILES, "g++")
 def messages_point_at_the_source(workspace):
     workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
@@ -126,8 +137,7 @@ def link_errors_are_counted_and_leave_no_target(workspace):
     output = workspace.run("all.qrex")
     holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
           "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
-          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker \"",
-          "/out/lib/x64/Debug\" -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
+          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker '$ORIGIN' -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
           "\nCompleted with 0 warnings, 1 errors.")
     assert not workspace.path(PROGRAM).exists()
     workspace.replace("tree/app/src/parts.cpp", "int Other()", "int Parts()")
@@ -154,6 +164,48 @@ def a_program_without_libraries_is_linked(workspace):
     workspace.run("all.qrex", "mode=gen")
     workspace.shell(MAKE)
     workspace.shell(PROGRAM, status=7)
+
+
+# A program that needs a prepackaged library, a library that a static subproject names, and an assembled file.
+BEHIND_A_LIBRARY = {
+    **PROGRAM_ALONE,
+    "tree/app/src/app.qrpj": PROGRAM_ALONE["tree/app/src/app.qrpj"].replace(
+        "qrex", 'subproj { "d" "s" }\n+link { "vendor/$(Platform).o" -L"$(Configuration)" }\nqrex').replace(
+        '"x.cpp"', '"x.cpp" "z.asm"'),
+    "tree/app/src/x.cpp": 'extern "C" int D(), S(), V(), W(), Z();\nint main() { return D() + S() + W() + Z(); }\n',
+    "tree/app/src/z.asm": ".intel_syntax noprefix\n.globl Z\nZ: mov eax, 2\nret\n",
+    "tree/d/src/d.qrpj": '$TARGET_TYPE = "Dynamic-Link Library"\n$ROOT_TO_PROJDIR = "d"\nconfig { "Debug|x64" }\n'
+                         "qrex export { }\n",
+    "tree/s/src/s.qrpj": '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "s"\nconfig { "Debug|x64" }\n'
+                         '+link { "vendor/libv.a" }\nqrex { "src" { "s.c" } }\n',
+    "tree/s/src/s.c": "int V(); int S() { return V(); }\n",
+    "tools/ml": '#!/bin/sh\necho >> assembled\nsed \'s/.*"\\(.*\\)" "\\(.*\\)"/gcc -c -x assembler -o \\1z.obj \\2/\' "${5#@}"'
+                " | tr -d '\\r' | sh\n",
+}
+
+
+@in_workspace(BEHIND_A_LIBRARY, "g++")
+def what_switches_name_reaches_the_program(workspace):
+    def compile(function, value, output, switches="-c"):
+        workspace.write("one.c", f"int {function}() {{ return {value}; }}\n")
+        workspace.shell(f"mkdir -p vendor tree/x64/Debug && gcc {switches} -o {output} one.c")
+
+    compile("D", 1, "tree/x64/Debug/libd.so", "-shared -fPIC -Wl,-soname,libd.so")
+    compile("V", 10, "v.o")
+    compile("W", 100, "vendor/x64.o")
+    workspace.shell("ar rcs vendor/libv.a v.o")
+    holds(workspace.run("all.qrex"), "\nCompleted....")
+    workspace.shell(f"cd / && {workspace.path(PROGRAM)}", status=113)
+    lacks(workspace.run("all.qrex"), "Linking...")
+    equal(workspace.path("assembled").read_text(), "\n")
+    compile("V", 20, "v.o")
+    workspace.shell("ar rcs vendor/libv.a v.o")
+    holds(workspace.run("all.qrex"), "Linking...")
+    compile("W", 50, "vendor/x64.o")
+    holds(workspace.run("all.qrex"), "Linking...")
+    compile("D", 2, "tree/x64/Debug/libd.so", "-shared -fPIC -Wl,-soname,libd.so")
+    workspace.run("all.qrex")
+    workspace.shell(PROGRAM, status=74)
 
 
 def failing_tools_are_counted_and_the_next_run_recovers(binary):
@@ -262,9 +314,11 @@ def make_takes_a_compiler_launcher(workspace):
 
 run_tests([
     builds_libraries_and_a_program_and_only_what_is_stale,
+    a_built_tree_moves_and_two_checkouts_are_equal,
     messages_point_at_the_source,
     link_errors_are_counted_and_leave_no_target,
     a_program_without_libraries_is_linked,
+    what_switches_name_reaches_the_program,
     failing_tools_are_counted_and_the_next_run_recovers,
     missing_tools_are_named_and_counted,
     captured_output_that_cannot_be_read_is_an_error,

@@ -9,13 +9,13 @@ import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import COMPILERS, SETTINGS, Workspace, equal, need, run_tests  # noqa: E402
+from workspace_fixture import COMPILERS, SETTINGS, Workspace, equal, holds, need, run_tests  # noqa: E402
 
 PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n%s\n{\n    "src"\n    {\n        %s\n    }\n}\n'
 FILES = {
     "main.qrex": SETTINGS.replace('"tree"', '"tree" "more"') + "translateOnly = true\n",
     "tree/.qrwsroot": "",
-    "tree/all.qrws": '"all" { "core" "app" "tool" }\n',
+    "tree/all.qrws": '"main" { "core" "app" "tool" }\n',
     "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "qrex", '"core.cpp"'),
     "tree/core/src/core.cpp": "int core() { return 0; }\n",
     "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" } qrex', '"app.cpp"'),
@@ -124,6 +124,55 @@ def a_library_that_this_program_does_not_build(binary):
           ["tree/core/src/core.qrpj does not say qrex: this program does not build core, which app links against"])
 
 
+def an_assembler_that_is_missing(binary):
+    changes = {"tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", "qrex", '"app.cpp" "a.asm" "b.asm"'),
+               "tree/app/src/a.asm": "", "tree/app/src/b.asm": "", "tree/all.qrws": '"all" { "app" }\n'}
+    equal(hints_of(binary, changes, "translateOnly=false", 'PATH("x64") = { "none" }'),
+          ["an .asm is given to ml /coff; this compiler has no assembler of its own for it"])
+
+
+def an_import_that_cannot_be_used(binary):
+    imports = {"tree/tool/src/tool.qrpj": PROJECT % ("Static Library", "tool", "qrex", '"tool.h" "tool.cpp"'),
+               "tree/tool/src/tool.h": "inline int Tool() { return 1; }\n",
+               "tree/app/src/app.cpp": '@import "tool/src/tool.h"\nint core();\nint main() { return core() + Tool(); }\n'}
+    missing = '; write "tool" in subproj { } of tree/app/src/app.qrpj, and it is built first'
+    left = "the run ends here and leaves out: tool"
+    need("g++")
+    equal(hints_of(binary, imports, "translateOnly=false"), ["app/src/app.cpp imports it" + missing, left])
+    plain = PROJECT % ("Static Library", "tool", "", '"tool.h" "tool.cpp"')
+    equal(hints_of(binary, {**imports, "tree/tool/src/tool.qrpj": plain}),
+          ["app/src/app.cpp imports it; write qrex in tree/tool/src/tool.qrpj, or #include it" + missing, left])
+    uses = PROJECT % ("Console Application", "app", 'subproj { "core" "tool" } qrex', '"app.cpp"')
+    equal(hints_of(binary, {**imports, "tree/tool/src/tool.qrpj": plain, "tree/app/src/app.qrpj": uses}),
+          ["app/src/app.cpp imports it; write qrex in tree/tool/src/tool.qrpj, or #include it"])
+
+
+def sources_that_are_only_copied(binary):
+    what = " only copied: what is compiled ends in .cpp or .c, a header with declarations in .h"
+    files = {"tree/tool/src/tool.qrpj": PROJECT % ("Console Application", "tool", "qrex", '"tool.cpp" "a.cc" "b.HPP" "c.c++"'),
+             **{f"tree/tool/src/{name}": "" for name in ("a.cc", "b.HPP", "c.c++")}}
+    equal(hints_of(binary, files), ["tool/src/a.cc and 2 more are" + what])
+    equal(hints_of(binary, files, "mode=gen"), ["tool/src/a.cc and 2 more are" + what])
+    with Workspace(binary, {**FILES, **files}) as workspace:
+        equal("only copied" in workspace.run("main.qrex"), False)
+        holds(workspace.run("main.qrex", "diagnostics=true"), "\ntool/src/a.cc and 2 more are" + what + "\n")
+
+
+def make_files_whose_call_builds_nothing(binary):
+    called = "make translates by Qrex all.qrex, "
+    settings = FILES["main.qrex"]
+    other = {"tree/all.qrws": '"all" { "core" "app" "tool" }\n'}
+    equal(hints_of(binary, other, "mode=gen"),
+          [called + 'which is not there: name main.qrex so, or "all" in the workspace file otherwise'])
+    equal(hints_of(binary, {**other, "all.qrex": settings}, "mode=gen"), [])
+    equal(hints_of(binary, other, "mode=gen", "compiler=vc14"), [])
+    equal(hints_of(binary, {}, "mode=gen"), [])
+    equal(hints_of(binary, {"main.qrex": settings + "mode = gen\n"}),
+          ["make translates by Qrex main.qrex, and mode = gen stands there: write mode = build, and call "
+           "Qrex main.qrex mode=gen for the make files"])
+
+
 run_tests([no_message_no_hint, a_workspace_or_project_that_is_not_found, a_source_that_is_missing,
-           an_import_that_is_not_found, an_invalid_word, a_configuration_that_a_project_lacks, a_line_of_the_command_line,
-           a_library_that_this_program_does_not_build])
+           an_import_that_is_not_found, an_import_that_cannot_be_used, sources_that_are_only_copied, an_invalid_word,
+           a_configuration_that_a_project_lacks, a_line_of_the_command_line, a_library_that_this_program_does_not_build,
+           an_assembler_that_is_missing, make_files_whose_call_builds_nothing])

@@ -52,6 +52,32 @@ def every_compiler_reads_the_same_files(workspace):
     equal(untracked(workspace, "."), "")
 
 
+PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\n@import "common.inc"\nsubproj { %s }\nqrex\n{ "src" { "*.cpp" } }\n'
+TARGETS = {
+    "zoo.qrws": '"zoo" { "base" "shared" "app" }\n',
+    "base/src/base.qrpj": PROJECT % ("Static Library", "base", ""),
+    "base/src/base.cpp": "int g_base = 1;\nint Base() { return g_base; }\n",
+    "shared/src/shared.qrpj": PROJECT % ("Dynamic-Link Library", "shared", '"base"'),
+    "shared/src/shared.cpp": "int Base();\nint Shared() { return Base() + 1; }\n",
+    "app/src/app.qrpj": PROJECT % ("Console Application", "app", '"shared"'),
+    "app/src/app.cpp": "int Shared();\nint main() { return Shared() - 2; }\n",
+}
+
+
+@in_workspace({}, "g++", "clang++", "make")
+def every_target_type_is_built_and_runs(workspace):
+    """By the tool and by make; wherever the targets are moved."""
+    workspace.run("--init", "zoo", ".")
+    for name, text in TARGETS.items():
+        workspace.write("tree/" + name, text)
+    for compiler in ("gcc", "clang"):
+        workspace.run("zoo.qrex", f"compiler={compiler}", "mode=gen")
+        for config, target in (("Debug", "d"), ("Release", "r")):
+            for command in (f"Qrex zoo.qrex compiler={compiler} 'config=\"{config}\"'", f"make -j2 {target}"):
+                workspace.shell(f"find x64 out -type f -delete; rm -rf moved && {command} && cp -r out/lib moved")
+                workspace.shell(f"find out -type f -delete; moved/x64/{config}/app")
+
+
 @in_workspace({})
 def nothing_is_overwritten(workspace):
     workspace.write("zoo/tree/common.inc", "mine\n")
@@ -96,5 +122,5 @@ def help_and_release(workspace):
     holds(workspace.run("--versions", status=1), "Exception: Couldn't open file --versions")
 
 
-run_tests([the_first_hour, every_compiler_reads_the_same_files, nothing_is_overwritten,
+run_tests([the_first_hour, every_compiler_reads_the_same_files, every_target_type_is_built_and_runs, nothing_is_overwritten,
            templates_are_found_where_an_installation_puts_them, help_and_release])

@@ -64,7 +64,7 @@ def translate(binary, workspace_file, keys="", tree=HERE / "runtime" / "tree"):
 
 
 # What every program needs of the library; the rest is for values by name and JSON.
-LIBRARY = ("byte_code", "graph", "layout", "models", "objects", "registry", "remote", "sources", "vxObject")
+LIBRARY = ("byte_code", "graph", "layout", "models", "objects", "registry", "releases", "remote", "sources", "vxObject")
 
 
 def write_library(workspace, sources=LIBRARY):

@@ -25,7 +25,7 @@ FILES = {
     "tree/app/src/app.qrpj": PROJECT % ("app", "Debug", "x64"),
 }
 # Names that the shell would run, or end a word at; each would leave a file behind.
-NAMES = ["$(touch RAN)", "`touch RAN`", "a;touch RAN;b", "a&touch RAN&", "$HOME", "a' b", "a, b", "~", "a*"]
+NAMES = ["$(touch RAN)", "`touch RAN`", "a;touch RAN;b", "a&touch RAN&", "$HOME", "a' b", "a, b", "~", "a*", "-x", "@x"]
 
 
 def names_do_not_run(binary):
@@ -42,6 +42,34 @@ def names_do_not_run(binary):
             holds(workspace.run("all.qrex"), "\nCompleted..")
             assert not list(workspace.folder.rglob("RAN")), f"{name} was run"
             assert workspace.path(f"{name}/{name}/{name}/{name}").exists(), f"{name} is not built"
+            output = workspace.run("all.qrex", "mode=gen")
+            if set(name) & set("$`;'"):
+                equal([path.name for path in workspace.folder.glob("*make*")], [])
+                holds(output, f"Error : Make file make_{name}_{name}_{name} would run parts of the name {name}/{name}/{name}/",
+                      "Error : Make file makefile would run parts of the name ")
+
+
+# Sources whose names the tools must get as they are, in a folder whose own name would be a switch that runs a program.
+@in_workspace({}, "g++", "make")
+def sources_and_folders_are_names(workspace):
+    folder = 'x" -wrapper .,EVIL "y/'
+    names = ["a\\b.cpp", "a b.cpp", "a'b.cpp", "-x.cpp", "@x.cpp", "#a.cpp", "$(touch RAN).cpp"]
+    project = PROJECT.replace("qrex", "+cpp { -fPIC } qrex").replace('"a.cpp"', '"*.cpp"') % ("app", "Debug", "x64")
+    for name, text in {**FILES, "tree/app/src/app.qrpj": project.replace("Console Application", "Dynamic-Link Library")}.items():
+        workspace.write(folder + name, text)
+    for number, name in enumerate(names):
+        workspace.write(f"{folder}tree/app/src/{name}", f"int Named{number};\n")
+    output = workspace.shell(f"cd '{folder}' && Qrex all.qrex")
+    holds(output, "\nCompleted..")
+    symbols = workspace.shell(f"cd '{folder}' && nm -D out/lib/x64/Debug/libapp.so && Qrex all.qrex mode=gen")
+    holds(symbols, *[f"Named{number}\n" for number in range(len(names))])
+    holds(symbols, "Error : Make file make_app_x64_Debug would run parts of the name qrexsource/x64/Debug/app/src/")
+    workspace.write(f"{folder}tree/app/src/a\nb.cpp", "int Line;\n")
+    output = workspace.shell(f"cd '{folder}' && Qrex all.qrex")
+    holds(output, "ERROR: No tool can be given the name qrexsource/x64/Debug/app/src/a\nb.cpp : a line ends in it\n",
+          "\nCompleted with 0 warnings, 1 errors.")
+    lacks(output, "Linking...")
+    assert not list(workspace.folder.rglob("RAN"))
 
 
 def a_quote_in_a_name_is_refused(binary):
@@ -50,6 +78,7 @@ def a_quote_in_a_name_is_refused(binary):
                ("tree/app/src/app.qrpj", (PROJECT % ("app", "Debug", "x64")).replace('"a.cpp"', '"a.cpp" as "a\\"a.cpp"'),
                 "app.qrpj(5) : ", '"a\\"a.cpp"'),
                ("all.qrex", SETTINGS + 'config = "De\\"bug"\n', "all.qrex(13) : ", '"De\\"bug"'),
+               ("all.qrex", SETTINGS + '$TARGET_DIR = "De\\"bug/x64"\n', "all.qrex(13) : ", '"De\\"bug/x64"'),
                ("all.qrex", SETTINGS + 'virtualTree = { "tr\\"ee" }\n', "all.qrex(13) : ", '"tr\\"ee"')]
     for path, text, place, name in changes:
         with Workspace(binary, {**FILES, path: text}) as workspace:
@@ -108,5 +137,5 @@ def a_folder_that_cannot_be_listed_is_told(binary):
             holds(done.stdout, "app.qrpj(5) : Couldn't list folder tree/app/src : Access is denied.\n")
 
 
-run_tests([names_do_not_run, a_quote_in_a_name_is_refused, builds_in_one_folder_follow_each_other, tools_speak_english,
+run_tests([names_do_not_run, sources_and_folders_are_names, a_quote_in_a_name_is_refused, builds_in_one_folder_follow_each_other, tools_speak_english,
            writes_beyond_the_limit_of_file_sizes_fail, a_folder_that_cannot_be_listed_is_told])

@@ -108,7 +108,7 @@ TEST_F(OutputPolicyTest, GeneratedTextIsIndentedAndItsLinesEndOnTheWay) {
 
 // Beyond a limit of file sizes, as on a full disk: within the text, and in the last bytes, which only the close writes.
 TEST_F(OutputPolicyTest, WhatIsGeneratedIsCommittedWholeOrNotAtAll) {
-  platform::FailWritesBeyondLimit();
+  platform::SetSignals();
   rlimit before;
   getrlimit(RLIMIT_FSIZE, &before);
   const std::string text(300 << 10, 't');

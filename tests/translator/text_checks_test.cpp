@@ -81,6 +81,15 @@ TEST_F(TextChecksTest, OneWarningForEach) {
       {"$struct S\n{\n    $variant V { void; *{ xvector<V> v; } node; };\n    $functor void F();\n};", ""},
       {"$model A { int32 a; };\n$model B { int32 b; };\n$struct S <<reflect>> : mixin [ A B ] { };",
        "4) : warning W1018 : $struct S lists several models: write one that has the fields of all"},
+      {"$model A { int32 a; };\n$class S isa vesk::IPersistable : mixin [ model { int32 b; $schema { 1: + b } } ] { "
+       "};\n"
+       "$mixin M : model A { };\n$class T isa vesk::IPersistable : mixin [ M ] { };",
+       "3) : warning W1018 : $class S does not archive $model S_Mixin_0, which it lists: put the model "
+       "into "
+       "the head, or write Serialise and Deserialise\nt.h(5) : warning W1018 : $class T does not archive $mixin M, "
+       "which "
+       "it lists: put the model into the head, or write Serialise and Deserialise"},
+      {"$model A { int32 a; };\n$class S isa vesk::IObject : mixin [ A ] { };", ""},
       {"$mixin M\n{\n    $struct In : model { int32 a; } { };\n};",
        "4) : warning W1018 : $struct In can't stand in $mixin M: write it ahead of that"},
       {"$struct S\n{\n    $struct In : model { int32 a; } { };\n};\n$mixin M { $struct In { $int32 a; }; };", ""},

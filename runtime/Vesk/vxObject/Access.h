@@ -4,7 +4,7 @@
 // registration: they are walked by what their kind and the type of their elements tell.
 //
 // The fields of a class are those that it reflects, then those of its models; a `$dep` field is calculated and no field
-// here. Raw pointers, `ptr`, functors and types without reflection have no value (VK_NONE).
+// here. Raw pointers, `ptr`, functors and, in what is shown, types without reflection have no value (VK_NONE).
 //
 // Import this file where it is used; IObject.h does not. Everything throws AccessError unless it says otherwise.
 
@@ -41,7 +41,7 @@ class ValueTypes;
 class Value {
  public:
   Value() {}
-  // Any reflected type, and containers of such.
+  // Any reflected type, and containers of such. Throws for a class that nobody registered.
   template <typename T>
   static Value Of(T& value) {
     return Value(TypeOf<std::remove_const_t<T>>(), const_cast<std::remove_const_t<T>*>(&value));
@@ -66,7 +66,7 @@ class Value {
   // All of them in order, until `each` answers false: one walk, where asking by position walks each time.
   typedef std::function<bool(xstring const& name, Value const& value)> EachFunction;
   void Each(EachFunction const& each) const;
-  // By a path such as "lines[2].amount" or "prices[apple]". Empty where there is no such thing; malformed paths throw.
+  // By a path such as "lines[2].amount" or "prices[apple]". Empty where there is no such thing.
   Value Find(std::string_view path) const;
 
   // The value itself. T must be its type.
@@ -98,6 +98,8 @@ class Value {
   Value Child(ValueType const* type, void* address, xstring const& name) const;
   Value FieldAt(ssize_t position) const;
   xstring EntryName(ssize_t position, void* entry) const;
+  bool IsNamed(void* entry, std::string_view name) const;  // of a set or map
+  Value FindChild(std::string_view name) const;
   Value EntryAt(ssize_t position, void* entry) const;
 
   std::shared_ptr<ValueTypes> m_types;

@@ -3,7 +3,7 @@
 // Serialise(Archive&, T) of its name space. What is read is checked before it is assigned: a value never has contents
 // that its type does not allow.
 
-@import "Vesk/vxObject/ArchiveBytes.h"
+@import "Vesk/vxObject/Releases.h"
 
 #include <algorithm>
 
@@ -250,6 +250,7 @@ using DeserialiseFunction = decltype(Deserialise(std::declval<InputArchive&>(), 
 
 template <typename T>
 Archive& operator<<(Archive& ar, T const& v) {
+  if constexpr (std::is_class<T>::value) NoteModel<T>(ar.m_models);
   if constexpr (std::is_enum<T>::value) {
     SerialiseVariableLengthUint(ar, static_cast<uint32>(v));
   } else if constexpr (Detects<SerialiseMember, T>) {

@@ -73,6 +73,7 @@ class ByteBuffer {
 };
 
 struct InputArchive;
+class WrittenModels;
 
 // Writes into memory.
 struct Archive {
@@ -83,6 +84,7 @@ struct Archive {
   bool m_writesAddresses = false;    // of objects, in place of the objects
   bool m_hostOrder = false;          // scalars as the host has them: for bytes that stay in memory
   InputArchive* m_answer = nullptr;  // of an `ipc` call, whose results are read through an Archive
+  WrittenModels* m_models = nullptr; // where the archive is to name the releases of what is in it
 };
 
 // What an archive may ask of its reader. Whatever takes bytes is bounded by the bytes that are left.
@@ -137,6 +139,7 @@ struct ReadingState {
   InputArchive const* m_archive = nullptr;  // the innermost one that `>>` reads on this thread
   XTarget const* m_target = nullptr;        // of a release read outside `>>`, for the model that follows it at once
   RSN m_release = 0;
+  XTarget const** m_asked = nullptr;  // while a model is only asked for its project
 };
 inline thread_local ReadingState t_reading;
 

@@ -6,7 +6,9 @@
 
 #include <algorithm>
 #include <deque>
+#include <functional>
 #include <list>
+#include <limits>
 #include <map>
 #include <set>
 #include <stdexcept>
@@ -14,50 +16,99 @@
 
 namespace vesk {
 
+// Whether a value can hold no containers.
 template <typename T>
-class xvector : public std::vector<T> {
+constexpr bool IsLeaf = std::is_trivially_copyable<T>::value;
+template <typename C>
+constexpr bool IsLeaf<basic_xstring<C>> = true;
+template <typename A, typename B>
+constexpr bool IsLeaf<std::pair<A, B>> = IsLeaf<std::remove_const_t<A>> && IsLeaf<B>;
+
+// A container that may be assigned a part of itself, as a tree one of its branches, which is destroyed or written over
+// in the midst of a plain assignment.
+template <typename C>
+class Assignable : public C {
+ public:
+  using C::C;
+  Assignable() {}
+  Assignable(C const& items) : C(items) {}
+  Assignable(Assignable const&) = default;
+  Assignable(Assignable&&) = default;
+  Assignable& operator=(Assignable&&) = default;
+  Assignable& operator=(Assignable const& rhs) {
+    if constexpr (IsLeaf<typename C::value_type>) {
+      C::operator=(rhs);
+    } else {
+      C::operator=(C(rhs));
+    }
+    return *this;
+  }
+};
+
+template <typename T>
+class xvector : public Assignable<std::vector<T>> {
  public:
   typedef std::vector<T> base;
-  using base::base;
+  using typename base::const_iterator;
+  using typename base::iterator;
+  using Assignable<base>::Assignable;
   using base::erase;
+  using base::insert;
   xvector() {}
-  xvector(base const& items) : base(items) {}
+  xvector(base const& items) : Assignable<base>(items) {}
   void erase(ssize_t first, ssize_t count) { base::erase(base::begin() + first, base::begin() + first + count); }
+  // The items may be its own.
+  iterator insert(const_iterator at, T const* first, T const* last) {
+    if (last - first == 1) return base::insert(at, *first);
+    if (!IsOwn(first)) return base::insert(at, first, last);
+    const base items(first, last);
+    return base::insert(at, items.begin(), items.end());
+  }
+
+ private:
+  bool IsOwn(T const* item) const {
+    if constexpr (std::is_same<T, bool>::value) {
+      return false;
+    } else {
+      const std::less<T const*> less;
+      return !less(item, base::data()) && less(item, base::data() + base::size());
+    }
+  }
 };
 
 template <typename T>
-class xdeque : public std::deque<T> {
+class xdeque : public Assignable<std::deque<T>> {
  public:
-  using std::deque<T>::deque;
+  using Assignable<std::deque<T>>::Assignable;
 };
 
 template <typename T>
-class xlist : public std::list<T> {
+class xlist : public Assignable<std::list<T>> {
  public:
-  using std::list<T>::list;
+  using Assignable<std::list<T>>::Assignable;
 };
 
 template <typename T>
-class xset : public std::set<T> {
+class xset : public Assignable<std::set<T>> {
  public:
-  using std::set<T>::set;
+  using Assignable<std::set<T>>::Assignable;
   bool Insert(T const& key) { return this->insert(key).second; }
   bool Delete(T const& key) { return this->erase(key) > 0; }
   bool Contains(T const& key) const { return this->count(key) > 0; }
 };
 
 template <typename T>
-class xbag : public std::multiset<T> {
+class xbag : public Assignable<std::multiset<T>> {
  public:
-  using std::multiset<T>::multiset;
+  using Assignable<std::multiset<T>>::Assignable;
 };
 
 // A key that is not there: inserted by the non-const operator, std::out_of_range from the const one.
 template <typename K, typename V>
-class xmap : public std::map<K, V> {
+class xmap : public Assignable<std::map<K, V>> {
  public:
   typedef std::map<K, V> base;
-  using base::base;
+  using Assignable<base>::Assignable;
   V& operator[](K const& key) { return base::operator[](key); }
   V const& operator[](K const& key) const { return this->at(key); }
 };
@@ -102,7 +153,9 @@ class DynArray {
     std::swap(m_size, rhs.m_size);
     std::swap(m_items, rhs.m_items);
   }
+  // std::length_error for a size below 0, or above what memory could hold.
   void resize(ssize_t size) {
+    if (size < 0 || size > std::numeric_limits<ssize_t>::max() / static_cast<ssize_t>(sizeof(T))) throw std::length_error("size of a DynArray");
     DynArray items;
     if (size > 0) items.m_items = std::allocator<T>().allocate(static_cast<std::size_t>(size));
     std::uninitialized_value_construct_n(items.m_items, size);

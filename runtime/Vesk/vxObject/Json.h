@@ -36,7 +36,7 @@ class JsonError : public AccessError {
   using AccessError::AccessError;
 };
 
-// Of arrays and objects in each other; a value that is deeper is not written.
+// Of arrays and objects in each other.
 constexpr int kJsonDepth = 100;
 
 struct JsonStyle {
@@ -45,6 +45,7 @@ struct JsonStyle {
   bool m_replaceInvalid = false;
 };
 
+// Of a text that is read, and of one that is written: what a writer with the same limits wrote is read.
 struct JsonLimits {
   std::size_t m_bytes = std::size_t(64) << 20;    // of the text
   std::size_t m_memory = std::size_t(256) << 20;  // of the elements and objects that it makes
@@ -54,12 +55,12 @@ struct JsonLimits {
   std::function<bool(xstring const&)> m_allowType;     // types of values of an openvariant; the same
 };
 
-xstring ToJson(Value const& value, JsonStyle const& style = JsonStyle());
+xstring ToJson(Value const& value, JsonStyle const& style = JsonStyle(), JsonLimits const& limits = JsonLimits());
 void FromJson(Value const& value, std::string_view text, JsonLimits const& limits = JsonLimits());
 
 template <typename T>
-xstring ToJsonText(T const& value, JsonStyle const& style = JsonStyle()) {
-  return ToJson(Value::Of(value), style);
+xstring ToJsonText(T const& value, JsonStyle const& style = JsonStyle(), JsonLimits const& limits = JsonLimits()) {
+  return ToJson(Value::Of(value), style, limits);
 }
 template <typename T>
 void FromJsonText(T& value, std::string_view text, JsonLimits const& limits = JsonLimits()) {
@@ -68,8 +69,9 @@ void FromJsonText(T& value, std::string_view text, JsonLimits const& limits = Js
 
 // An object and what it leads to. What is read belongs to the caller, as with ReadObject.
 template <typename I>
-xstring ObjectToJson(ptr<I> const& object, JsonStyle const& style = JsonStyle()) {
-  return ToJsonText(pref<I>(object), style);
+xstring ObjectToJson(ptr<I> const& object, JsonStyle const& style = JsonStyle(),
+                     JsonLimits const& limits = JsonLimits()) {
+  return ToJsonText(pref<I>(object), style, limits);
 }
 template <typename I>
 ptr<I> ObjectFromJson(std::string_view text, JsonLimits const& limits = JsonLimits()) {

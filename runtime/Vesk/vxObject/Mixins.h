@@ -76,7 +76,15 @@ class ObjectHeap : private IObjectVisitor {
 template <typename T>
 T* DollarNew(T* object) {
   AssertFinalClass<T>();
-  if constexpr (IsObjectClass<T>) ObjectHeap::Get().Add(ptr<IObject>(object), sizeof(T));
+  if constexpr (IsObjectClass<T>) {
+    const ptr<IObject> whole(object);
+    try {
+      ObjectHeap::Get().Add(whole, sizeof(T));
+    } catch (...) {
+      whole->DestroyObject();
+      throw;
+    }
+  }
   return object;
 }
 

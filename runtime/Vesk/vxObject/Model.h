@@ -55,15 +55,6 @@ class ModelHook {
 // --- Barriers
 
 template <typename T>
-using ClassRecordExpression = decltype(static_cast<ReflectedClass const&>(_GetReflected(std::declval<T const*>())));
-
-template <typename T>
-ReflectedClass const* RecordOf() {
-  if constexpr (Detects<ClassRecordExpression, T>) return &_GetReflected(static_cast<T const*>(nullptr));
-  return nullptr;
-}
-
-template <typename T>
 void NotifyHooks(ModelChange::EKind kind, T* object, Path const& path, ConstStringZ name) {
   if (ModelHook::Any()) ModelHook::Notify({kind, object, RecordOf<T>(), path, name});
 }
@@ -197,6 +188,7 @@ RSN ReleaseBeingRead(XTarget const& target);
     static XTarget target(#X, RELEASE);                                            \
     return &target;                                                                \
   }                                                                                \
+  [[maybe_unused]] static XTarget* const X##_target = X##_GetXTarget();            \
   RSN X##_GetModelRsn() { return ReleaseBeingRead(*X##_GetXTarget()); }            \
   void X##_WriteDataSourceRsn(Archive& ar) { WriteRsn(*X##_GetXTarget(), ar); }    \
   void X##_ReadDataSourceRsn(InputArchive& ar) { ReadRsn(*X##_GetXTarget(), ar); } \

@@ -25,6 +25,7 @@ struct WrittenObjects {
   std::map<Key, std::size_t> m_numbers;
   std::size_t m_next = 0;    // the first object whose content is not written yet
   bool m_isWriting = false;  // who set it writes the contents
+  ReflectedClass const* m_record = nullptr;  // the class that was written last
 };
 
 struct NumberedObject {

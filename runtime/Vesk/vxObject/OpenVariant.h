@@ -12,7 +12,7 @@ class openvariant {
   template <typename U, typename = std::enable_if_t<!std::is_same<U, openvariant>::value>>
   openvariant(U const& value) : m_ops(&GetTypeOps<U>()), m_value(Clone(m_ops, &value)) {}
   openvariant(openvariant const& rhs) : m_ops(rhs.m_ops), m_value(Clone(m_ops, rhs.m_value)) {}
-  openvariant(openvariant&& rhs) { Swap(rhs); }
+  openvariant(openvariant&& rhs) noexcept { Swap(rhs); }
   openvariant& operator=(openvariant rhs) {
     Swap(rhs);
     return *this;
@@ -79,7 +79,7 @@ class openvariant {
  private:
   typedef std::unique_ptr<void, void (*)(void*)> Memory;
 
-  void Swap(openvariant& rhs) {
+  void Swap(openvariant& rhs) noexcept {
     std::swap(m_ops, rhs.m_ops);
     std::swap(m_value, rhs.m_value);
   }
@@ -112,7 +112,7 @@ class openvariant {
     for (ReflectedVariant const* record : All<ReflectedVariant>()) {
       if (&record->m_ops == ops) return record->m_name;
     }
-    throw ArchiveError("type of an openvariant is not registered");
+    throw ArchiveError(NotRegistered("type of an openvariant", ""));
   }
   static TypeOps const* FindOps(xstring const& name) {
     const auto at = TypeOpsTable().find(name);
@@ -124,7 +124,7 @@ class openvariant {
   // A name in an archive may be that of any registered type, also of one that no openvariant can hold.
   static TypeOps const& OpsOf(xstring const& name) {
     TypeOps const* ops = FindOps(name);
-    if (!ops) throw ArchiveError("type of an openvariant is not registered: " + name);
+    if (!ops) throw ArchiveError(NotRegistered("type of an openvariant", name));
     if (!ops->m_construct || !ops->m_copyConstruct || !ops->m_destruct || !ops->m_deserialise) {
       throw ArchiveError("type cannot be the value of an openvariant: " + name);
     }

@@ -12,6 +12,11 @@
 
 namespace vesk {
 
+struct IPersistable;  // of IObject.h, which imports this file
+
+// The class of an object; null for null.
+ReflectedClass const* ClassOf(ptr<IPersistable> const& object);
+
 // --- Writing
 
 // Sets a flag while it lives.
@@ -28,6 +33,9 @@ class FlagScope {
 
 void WritePersistable(Archive& ar, WrittenObject const& object);
 
+// The name of an object's class. ArchiveError for one that nobody registered: it could not be read.
+void WriteClassOf(Archive& ar, ReflectedClass const& record);
+
 // The contents of the objects that were mentioned, unless someone further out is about to write them.
 void WriteContents(Archive& ar);
 
@@ -39,10 +47,10 @@ void WriteObjectMention(Archive& ar, ptr<I> const& object) {
   ptr<IPersistable> persistable;
   if (object && !ar.m_writesAddresses) {
     persistable = QueryInterface<IPersistable>(object);
-    if (!persistable || !persistable->GetReflectedClass()) throw ArchiveError("object is not persistable");
+    if (!ClassOf(persistable)) throw ArchiveError("object is not persistable");
   }
   if (!WriteMention(ar, {object.Object(), persistable.Any(), WritePersistable}, typeid(void))) return;
-  ar << xstring(persistable->GetReflectedClass()->m_name);
+  WriteClassOf(ar, *ClassOf(persistable));
   WriteContents(ar);
 }
 
@@ -85,7 +93,13 @@ ssize_t ReadReference(InputArchive& ar, Make make) {
   const ssize_t position = static_cast<ssize_t>(number) - 1;
   if (mention == EMention::Null || mention == EMention::Known) return position;
   auto read = [&] {
-    objects.m_list.push_back(make());
+    objects.m_list.emplace_back();  // so that no object is without its place
+    try {
+      objects.m_list.back() = make();
+    } catch (...) {
+      objects.m_list.pop_back();
+      throw;
+    }
     if (mention == EMention::NewWithContent) ReadContent(ar, position);
   };
   if (objects.m_isReading) {
@@ -107,32 +121,7 @@ ssize_t ReadReference(InputArchive& ar, Make make) {
 bool ListsInterface(ReflectedClass const& record, ConstStringZ name);
 
 // Makes an object of the class that the archive names. `fits`: whether a class is what the reference asks for.
-template <typename Fits>
-NumberedObject MakePersistable(InputArchive& ar, Fits fits) {
-  xstring name;
-  ar >> name;
-  ReflectedClass const* record = Find<ReflectedClass>(name);
-  if (!record || !record->m_create) throw ArchiveError("no class to create: " + name);
-  if (!fits(*record) || !ListsInterface(*record, GetReflectedInterface<IPersistable>().m_name)) {
-    throw ArchiveError("not the class of the reference: " + name);
-  }
-  if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
-  const ptr<IPersistable> made = QueryInterface<IPersistable>(record->m_create());
-  if (!made) throw ArchiveError("not persistable: " + name);
-  NumberedObject object;
-  object.m_self = made.Object();
-  object.m_persistable = made.Any();
-  object.m_type = &typeid(void);
-  object.m_read = [](InputArchive& input, NumberedObject const& o) {
-    ptr<IPersistable>(o.m_persistable)->Deserialise(input);
-  };
-  object.m_forget = [](NumberedObject const& o) {
-    ReferenceCleaner cleaner;
-    ptr<IPersistable>(o.m_persistable)->VisitPrefs(cleaner);
-  };
-  object.m_destroy = [](NumberedObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
-  return object;
-}
+NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedClass const&)> const& fits);
 
 template <typename C>
 NumberedObject MakeStruct() {
@@ -177,7 +166,7 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
     position = ReadReference(ar, [&] { return MakePersistable(ar, isClass); });
     if (position >= 0) {
       const ptr<IPersistable> object(ar.m_objects.m_list[position].m_persistable);
-      ReflectedClass const* record = object ? object->GetReflectedClass() : nullptr;
+      ReflectedClass const* record = ClassOf(object);
       fits = record && isClass(*record);
     }
   } else {
@@ -191,30 +180,38 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
 // --- Whole objects
 
 // Stands ahead of a whole object; the last byte is the version of the form. No reference begins so, hence what was
-// written without it can be read as well.
-constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 1};
+// written without it can be read as well. From the second version on the releases of the projects follow (Releases.h).
+constexpr octet_t ObjectMark[] = {0xFF, 'v', 'x', 2};
 
-void ReadObjectMark(InputArchive& ar);
+void ReadObjectHead(InputArchive& ar);
+xvector<octet_t> WithObjectHead(Archive const& objects);
 
 // An object with all that it refers to: classes and contents.
 template <typename I>
 xvector<octet_t> WriteObject(ptr<I> const& object) {
+  WrittenModels models;
   Archive ar;
-  ar.Write(ObjectMark, sizeof(ObjectMark));
+  ar.m_models = &models;
   ar << pref<I>(object);
-  return ar.m_bytes;
+  return WithObjectHead(ar);
 }
 
-// What WriteObject wrote. The objects belong to the caller; the archive is refused (ArchiveError) where the first is
-// no I. `allow` is asked before an object of a class is made.
+// What WriteObject wrote, and nothing behind it. The objects belong to the caller; the archive is refused
+// (ArchiveError) where the first is no I. `allow` is asked before an object of a class is made.
 template <typename I>
 ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits(),
                   std::function<bool(ReflectedClass const&)> allow = nullptr) {
   InputArchive ar(std::move(bytes), limits);
-  ReadObjectMark(ar);
+  ReadObjectHead(ar);
   ar.m_objects.m_allow = std::move(allow);
   pref<I> reference;
-  ar >> reference;
+  try {
+    ar >> reference;
+    if (ar.Remaining() > 0) throw ArchiveError("bytes behind the object");
+  } catch (...) {
+    ar.m_objects.Destroy();
+    throw;
+  }
   return reference.Get();
 }
 

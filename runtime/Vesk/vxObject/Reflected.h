@@ -287,6 +287,16 @@ ReflectedFunctor const& GetReflectedFunctor() {
   return _GetReflected(static_cast<T const*>(nullptr));
 }
 
+template <typename T>
+using ClassRecordExpression = decltype(static_cast<ReflectedClass const&>(_GetReflected(std::declval<T const*>())));
+
+// Null for a class without a record.
+template <typename T>
+ReflectedClass const* RecordOf() {
+  if constexpr (Detects<ClassRecordExpression, T>) return &_GetReflected(static_cast<T const*>(nullptr));
+  return nullptr;
+}
+
 // Null for a number without a label.
 inline ConstStringZ FindLabel(ReflectedEnum const& record, int32 number) {
   if (!record.m_values) return number >= 0 && number < record.m_numLabels ? record.m_labels[number] : nullptr;

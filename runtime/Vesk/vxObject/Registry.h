@@ -9,14 +9,24 @@ namespace vesk {
 // A project at run time: vxDefineTarget (Model.h) makes it. Where its module is unloaded, what it registered goes
 // with it.
 struct XTarget {
-  XTarget(ConstStringZ name, RSN rsn) : m_name(name), m_rsn(rsn) {}
+  XTarget(ConstStringZ name, RSN rsn);
   ~XTarget();
   XTarget(XTarget const&) = delete;
   void operator=(XTarget const&) = delete;
 
   ConstStringZ m_name;
-  RSN m_rsn;  // the release that it writes
+  RSN m_rsn;                                    // the release that it writes
+  ReflectedClass const* m_latestModel = nullptr;  // of the registered ones that whose `$schema` ends with the last release
 };
+
+// Those of the program and its modules.
+xvector<XTarget const*> AllTargets();
+
+// The last release in the `$schema` of a model; 0 without one.
+RSN LastRelease(ReflectedClass const& record);
+
+// ArchiveError where the project writes a release that is older than what a `$schema` ends with.
+void CheckRelease(XTarget const& target);
 
 enum NSE { NSE_OK, NSE_ALREADY_DEFINED };
 
@@ -39,6 +49,9 @@ xvector<R const*> All();
 // The project that registered the record; null for none.
 template <typename R>
 XTarget* TargetOf(R const& record);
+
+// What is said of something that nobody registered, with the calls that may be missing. The name may be empty.
+xstring NotRegistered(std::string_view what, std::string const& name);
 
 // --- Types
 

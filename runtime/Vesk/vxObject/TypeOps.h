@@ -34,7 +34,7 @@ void PrintVariable(xostream& os, T const* x) {
 
 template <typename T>
 void ConstructArray(T* array, ssize_t begin, ssize_t end) {
-  for (ssize_t i = begin; i < end; ++i) new (array + i) T();
+  std::uninitialized_value_construct(array + begin, array + end);
 }
 
 // A container of keys that have no order is always empty, and not every standard library can copy it.
@@ -45,12 +45,10 @@ constexpr bool IsEverEmpty<T, std::enable_if_t<ContainerTraits<T>::keyed>> = !Ha
 
 template <typename T>
 void CopyConstructArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
-  for (ssize_t i = begin; i < end; ++i, ++at) {
-    if constexpr (IsEverEmpty<T>) {
-      new (array + at) T();
-    } else {
-      new (array + at) T(source[i]);
-    }
+  if constexpr (IsEverEmpty<T>) {
+    ConstructArray(array, at, at + end - begin);
+  } else {
+    std::uninitialized_copy(source + begin, source + end, array + at);
   }
 }
 

@@ -32,7 +32,8 @@ struct ValueType {
   ReflectedClass const* m_class = nullptr;
   ReflectedEnum const* m_enum = nullptr;
   ReflectedVariant const* m_variant = nullptr;
-  xstring m_target;  // what a reference leads to: an interface or a class
+  xstring m_target;     // what a reference leads to: an interface or a class
+  xstring m_forgotten;  // of a type without values: the class or variant in it that nobody registered
 
   // A map's value in its pair.
   std::size_t ValueOffset() const { return (m_key->m_size + m_item->m_align - 1) / m_item->m_align * m_item->m_align; }
@@ -100,6 +101,8 @@ class HeldValue {
 typedef std::function<void(void*)> ValueFunction;
 
 ssize_t CountOf(ValueType const& type, void const* container);
+// The entry at a position that the container has; of bits nothing but that there is one.
+void* EntryOf(ValueType const& type, void* container, ssize_t position);
 // Until `each` answers false.
 void EachEntry(ValueType const& type, void* container, std::function<bool(void*)> const& each);
 void MakeContainer(ValueType const& type, void* container);

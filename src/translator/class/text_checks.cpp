@@ -35,6 +35,18 @@ void CheckModels(QrexParser& parser, const ClassDef& def) {
   }
 }
 
+// What archives an object is the model in the head of its class; a mixin has no part in it.
+void CheckArchivedModel(QrexParser& parser, const ClassDef& def) {
+  if (!def.m_implementsIPersistable || def.m_inheritsModel || def.IsMixin()) return;
+  std::vector<const ClassDef*> models;
+  std::set<const ClassDef*> walked;
+  CollectModels(def, models, walked);
+  if (models.empty()) return;
+  parser.WarnOfText(PrintedElement(def) + " does not archive " + PrintedElement(*models.back()) +
+                        ", which it lists: put the model into the head, or write Serialise and Deserialise",
+                    def);
+}
+
 void CheckModelField(QrexParser& parser, const ClassDef& def, const ModelField& field) {
   if (field.m_name == "model") {
     parser.WarnOfText("Model field " + field.m_name + " of " + PrintedElement(def) +
@@ -120,6 +132,7 @@ void CheckTextOfClass(QrexParser& parser, const ClassDef& def) {
   CheckModels(parser, def);
   if (!parser.WantsCompilableText()) return;
   CheckEnclosing(parser, def);
+  CheckArchivedModel(parser, def);
   CheckConstFields(parser, def);
   CheckTemplateParameters(parser, def);
   CheckLocal(parser, def);

@@ -55,6 +55,10 @@ class Importer : public ImportHandler {
     ProjectFile* target = m_file.ResolveImport(path);
     if (!target) return false;
     ScannedFile& imported = m_file.host.GetScannedFile(*target);
+    if (!imported.file.project->usesQrex) {
+      throw LexScannerException("File " + imported.SourcePath() + " is not part of a project using qrex", nullptr)
+          .WithHint(m_file.UseHint(imported));
+    }
     BringUpToDate(imported);
 
     // A file in progress is not translated again, so a cycle shows as a chain from the import back to this file.
@@ -267,9 +271,6 @@ bool CopySource(const ScannedFile& file, const std::string& target) {
 }  // namespace
 
 void BringUpToDate(ScannedFile& file) {
-  if (!file.file.project->usesQrex) {
-    throw LexScannerException("File " + file.SourcePath() + " is not part of a project using qrex", nullptr);
-  }
   if (file.translated) return;
   file.translated = true;
   const std::string target = file.host.TranslatedPath(file);

@@ -16,6 +16,11 @@ void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
   FunctionSignature call = signature;
   call.name = "operator()";
   call.isInline = false;
+  const bool compilable = def.WantsCompilableText();
+  auto writeRecord = [&] {  // which else only the source that defines it knows
+    Write(out, "$api$vesk::ReflectedFunctor const& _GetReflected($name$ const*);\n", "api"_ = ExportPrefix(def),
+          "name"_ = def.name);
+  };
   Write(
       out, R"(
     class $name$
@@ -36,19 +41,22 @@ void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
         void bool_type_mem_fn() const {}
         operator bool_type() const { return m_stubFn ? &$name$::bool_type_mem_fn : 0; }
         $name$& operator=(vesk::NullInterface) { m_self = nullptr; m_stubFn = nullptr; return *this; }
-        $call$ { $return$m_stubFn(m_self$comma$$arguments$); }
+        $call$ { $check$$return$m_stubFn(m_self$comma$$arguments$); }
         void write(vesk::xostream& os) const { os << "$name$(" << m_self << ',' << (void*)m_stubFn << ')'; }
     private:
         void* m_self;
         STUB_FN m_stubFn;
     };
     $friend$inline vesk::xostream& operator<<(vesk::xostream& os, $name$ f) { f.write(os); return os; }
+    $record$
   )",
-      "friend"_ = If(def.m_nested && def.WantsCompilableText(), "friend "), "name"_ = def.name,
+      "friend"_ = If(def.m_nested && compilable, "friend "), "name"_ = def.name,
       "stub"_ = [&] { WriteSelfSignature(out, signature, "(__stdcall *STUB_FN)"); },
-      "call"_ = [&] { WriteSignature(out, call); }, "return"_ = [&] { WriteReturn(out, signature.returnType); },
-      "comma"_ = signature.arguments.empty() ? "" : ",",
-      "arguments"_ = [&] { WriteArgNames(out, signature.arguments); });
+      "call"_ = [&] { WriteSignature(out, call); },
+      "check"_ = If(compilable, "if (!m_stubFn) throw std::logic_error(\"call of a null " + def.name + "\"); "),
+      "return"_ = [&] { WriteReturn(out, signature.returnType); }, "comma"_ = signature.arguments.empty() ? "" : ",",
+      "arguments"_ = [&] { WriteArgNames(out, signature.arguments); },
+      "record"_ = If(compilable && def.m_reflected && !def.m_nested, writeRecord));
 }
 
 void FunctorDef::WriteReflectedDefinition(TextWriter& out) {

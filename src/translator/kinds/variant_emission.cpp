@@ -196,6 +196,33 @@ void WriteAccesses(TextWriter& out, const VariantDef& def) {
   for (const auto& item : def.m_items) WriteAccess(out, *item);
 }
 
+void WriteAssignment(TextWriter& out, const VariantDef& def) {
+  if (!MakesValueFirst(def)) {
+    Write(out, R"(
+      $name$& operator=($name$ const& _rhs)
+      {
+          if (this != &_rhs) { this->~$name$(); new (this) $name$(_rhs); }
+          return *this;
+      }
+    )",
+          "name"_ = def.name);
+    return;
+  }
+  Write(out, R"(
+    $name$& operator=($name$ const& _rhs)
+    {
+        if (this != &_rhs) { $name$ _value(_rhs); this->~$name$(); new (this) $name$(std::move(_value)); }
+        return *this;
+    }
+    $name$& operator=($name$&& _rhs) noexcept($noexcept$)
+    {
+        if (this != &_rhs) { $name$ _value(std::move(_rhs)); this->~$name$(); new (this) $name$(std::move(_value)); }
+        return *this;
+    }
+  )",
+        "name"_ = def.name, "noexcept"_ = NoexceptText(def));
+}
+
 void WriteData(TextWriter& out, const VariantDef& def) {
   if (def.AllVoid()) return;
   auto writeSize = [&](const std::unique_ptr<VariantItem>& item) {
@@ -210,6 +237,10 @@ void WriteData(TextWriter& out, const VariantDef& def) {
 void WriteVariantBody(TextWriter& out, const VariantDef& def) {
   const bool inClass = IsInClass(def);
   auto declared = [&](std::string text) { return inClass ? std::string() : text; };  // is defined behind the class
+  const bool makesFirst = MakesValueFirst(def);
+  const std::string moving =
+      makesFirst ? def.name + "(" + def.name + "&& _rhs) noexcept(" + NoexceptText(def) + ");\n" : "";
+  const bool declaresReading = makesFirst && def.HasSerialise() && !inClass;
   auto writeItemType = [&](const auto& item) { WriteItemType(out, def, *item); };
   auto writeConstructor = [&](const auto& item) { WriteConstructor(out, def, *item); };
   auto writeTest = [&](const auto& item) {
@@ -223,11 +254,7 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
     $mapValues$
     $constructors$
     $copying$
-    $name$& operator=($name$ const& _rhs)
-    {
-        if (this != &_rhs) { this->~$name$(); new (this) $name$(_rhs); }
-        return *this;
-    }
+    $assignment$
     $visiting$
     vesk::int32 GetTag() const { return _tag; }
     $equal$
@@ -239,20 +266,24 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
     private:
     $accesses$
     $tests$
+    $ofTag$
     vesk::int32 _tag;
     $data$
   )",
       "name"_ = def.name, "itemTypes"_ = Each(out, def.m_items, "", writeItemType), "T"_ = ParameterOf(def),
       "any"_ = If(inClass, ",typename=void"), "mapValues"_ = If(inClass, [&] { WriteMapValues(out, def); }),
       "constructors"_ = Each(out, def.m_items, "", writeConstructor),
-      "copying"_ = declared(def.name + "(" + def.name + " const& _rhs);\n~" + def.name + "();"),
+      "copying"_ = declared(def.name + "(" + def.name + " const& _rhs);\n" + moving + "~" + def.name + "();"),
+      "assignment"_ = [&] { WriteAssignment(out, def); },
       "visiting"_ =
           declared("void VisitObjects(vesk::IObjectVisitor&) const;\nvoid VisitPrefs(vesk::IPrefVisitor&) const;"),
       "equal"_ = declared("bool operator==(" + def.name + " const& _rhs) const;"),
       "less"_ = declared("bool operator<(" + def.name + " const& _rhs) const;"),
       "members"_ = If(inClass, [&] { WriteVariantMembers(out, def); }),
       "operations"_ = [&] { WriteOperationDeclarations(out, def); }, "accesses"_ = [&] { WriteAccesses(out, def); },
-      "tests"_ = Each(out, def.m_items, "", writeTest), "data"_ = [&] { WriteData(out, def); });
+      "tests"_ = Each(out, def.m_items, "", writeTest),
+      "ofTag"_ = declaresReading ? def.name + "(vesk::int32 _new,vesk::NullInterface);" : "",
+      "data"_ = [&] { WriteData(out, def); });
 }
 
 // --- Behind the class

@@ -13,7 +13,38 @@ std::string ConstructionText(const VariantItem& item, const std::string& type) {
 
 namespace {
 
-enum class Operation { Copy, Destroy, Equal, Less, Print, VisitObjects, VisitPrefs, Serialise, Deserialise };
+// As its value is made and destroyed: not the struct that a name stands for, which copies.
+const std::string& ValueTypeText(const VariantItem& item) { return item.isStruct ? item.name : item.typeText; }
+
+}  // namespace
+
+bool MakesValueFirst(const VariantDef& def) { return def.WantsCompilableText() && !def.AllVoid(); }
+
+std::string NoexceptText(const VariantDef& def) {
+  std::string text;
+  for (const auto& item : def.m_items) {
+    if (item->isVoid || item->onHeap) continue;
+    text += (text.empty() ? "" : " && ") + ("std::is_nothrow_move_constructible<" + ValueTypeText(*item)) + " >::value";
+  }
+  return text.empty() ? "true" : text;
+}
+
+namespace {
+
+enum class Operation {
+  Copy,
+  Move,
+  Make,
+  Destroy,
+  Equal,
+  Less,
+  Print,
+  VisitObjects,
+  VisitPrefs,
+  Serialise,
+  Deserialise,  // into the memory of the variant
+  Read          // into a new variant
+};
 
 // An enumeration has no destructor, and C++ may name a scalar in several ways: a name of the type's own serves for all.
 std::string CompilableDestructionText(const VariantDef& def, const VariantItem& item, const std::string& value) {
@@ -47,6 +78,12 @@ std::string StatementOf(Operation operation, const VariantDef& def, const Varian
   switch (operation) {
     case Operation::Copy:
       return item.isVoid ? "" : ConstructionText(item, name) + "(_rhs." + value + ");";
+    case Operation::Move:  // what had a value on the heap has none
+      if (item.isVoid) return {};
+      return item.onHeap ? "*(" + name + "**)_data = *(" + name + "**)_rhs._data; _rhs._tag = -1;"
+                         : ConstructionText(item, ValueTypeText(item)) + "(std::move(_rhs." + value + "));";
+    case Operation::Make:
+      return item.isVoid ? "" : ConstructionText(item, ValueTypeText(item)) + "();";
     case Operation::Destroy:
       return DestructionText(def, item, value);
     case Operation::Equal:
@@ -63,8 +100,11 @@ std::string StatementOf(Operation operation, const VariantDef& def, const Varian
       return item.isStruct ? value + ".Serialise(_ar);" : item.isVoid ? "" : "_ar << " + value + ";";
     case Operation::Deserialise:
       if (item.isVoid) return {};
-      return ConstructionText(item, item.isStruct ? name : item.typeText) + "(); " +
+      return StatementOf(Operation::Make, def, item) + " " +
              (item.isStruct ? value + ".Deserialise(_ar);" : "_ar >> " + value + ";");
+    case Operation::Read:
+      if (item.isVoid) return {};
+      return item.isStruct ? "_value." + value + ".Deserialise(_ar);" : "_ar >> _value." + value + ";";
   }
   return {};
 }
@@ -80,6 +120,7 @@ class VariantMembers {
 
   void WriteAll() {
     WriteCopying();
+    if (MakesValueFirst(m_def)) WriteMaking();
     WriteComparisons();
     if (m_def.WritesToStream()) WriteStreamWrite();
     WriteVisits();
@@ -90,6 +131,7 @@ class VariantMembers {
   // A case for each item with which the operation has something to do; nothing without such an item.
   void WriteSwitch(Operation operation) {
     const bool returns = operation == Operation::Equal || operation == Operation::Less;
+    const bool isNew = operation == Operation::Move || operation == Operation::Make || operation == Operation::Read;
     std::string cases;
     for (const auto& item : m_def.m_items) {
       const std::string statement = StatementOf(operation, m_def, *item);
@@ -99,13 +141,14 @@ class VariantMembers {
     }
     if (cases.empty()) return;
     Write(m_out, R"(
-      switch(_tag)
+      switch($tag$)
       {
           $cases$
           $default$
       }
     )",
-          "cases"_ = cases, "default"_ = operation == Operation::Print ? "default: vxAssert(0);" : "");
+          "tag"_ = isNew ? "_new" : "_tag", "cases"_ = cases,
+          "default"_ = operation == Operation::Print ? "default: vxAssert(0);" : "");
   }
   auto Switch(Operation operation) {
     return [this, operation] { WriteSwitch(operation); };
@@ -125,6 +168,31 @@ class VariantMembers {
     )",
           "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "copy"_ = Switch(Operation::Copy),
           "destroy"_ = Switch(Operation::Destroy));
+  }
+
+  // The tag comes last: until then there is nothing to destroy.
+  void WriteMaking() {
+    Write(m_out, R"(
+      $inline$$scope$$name$($name$&& _rhs) noexcept($noexcept$)
+      {
+          const vesk::int32 _new = _rhs._tag;
+          _tag = -1;
+          $move$
+          _tag = _new;
+      }
+    )",
+          "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "noexcept"_ = NoexceptText(m_def),
+          "move"_ = Switch(Operation::Move));
+    if (!m_def.HasSerialise()) return;
+    Write(m_out, R"(
+      $inline$$scope$$name$(vesk::int32 _new,vesk::NullInterface)
+      {
+          _tag = -1;
+          $make$
+          _tag = _new;
+      }
+    )",
+          "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "make"_ = Switch(Operation::Make));
   }
 
   void WriteComparisons() {
@@ -173,10 +241,8 @@ class VariantMembers {
   }
 
   void WriteArchives() {
-    const bool destroys = std::any_of(m_def.m_items.begin(), m_def.m_items.end(), [this](const auto& item) {
-      return !StatementOf(Operation::Destroy, m_def, *item).empty();
-    });
-    Write(m_out, R"(
+    Write(
+        m_out, R"(
       template<typename Archive> $inline$void $scope$Serialise(Archive& _ar) const
       {
           vesk::SerialiseVariableLengthUint(_ar,_tag);
@@ -184,12 +250,33 @@ class VariantMembers {
       }
       template<typename Archive> $inline$void $scope$Deserialise(Archive& _ar)
       {
-          $destruction$
-          vesk::DeserialiseVariableLengthUint(_ar,_tag);
           $deserialise$
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "serialise"_ = Switch(Operation::Serialise),
+        "inline"_ = m_inline, "scope"_ = m_scope, "serialise"_ = Switch(Operation::Serialise),
+        "deserialise"_ = [this] { MakesValueFirst(m_def) ? WriteReading() : WriteReadingInPlace(); });
+  }
+
+  void WriteReading() {
+    Write(m_out, R"(
+      vesk::int32 _new;
+      vesk::DeserialiseVariableLengthUint(_ar,_new);
+      $name$ _value(_new,vesk::null);
+      $read$
+      *this = std::move(_value);
+    )",
+          "name"_ = m_name, "read"_ = Switch(Operation::Read));
+  }
+
+  void WriteReadingInPlace() {
+    const bool destroys = std::any_of(m_def.m_items.begin(), m_def.m_items.end(), [this](const auto& item) {
+      return !StatementOf(Operation::Destroy, m_def, *item).empty();
+    });
+    Write(m_out, R"(
+      $destruction$
+      vesk::DeserialiseVariableLengthUint(_ar,_tag);
+      $deserialise$
+    )",
           "destruction"_ = destroys ? "this->~" + m_name + "();" : "", "deserialise"_ = Switch(Operation::Deserialise));
   }
 

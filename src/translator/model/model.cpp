@@ -196,7 +196,10 @@ void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& 
   out << "\n";
   // A dropped field is read into a local variable, where later evolve calls find it.
   if (field.IsDropped()) {
-    Write(out, "$type$ $name$;\n", "type"_ = TypeView(field.m_type), "name"_ = field.m_name);
+    const TypeView type = WithoutDecorators(field.m_type, *def.owner.rootNameSpace).type;
+    const bool isIndeterminate = type.IsScalar() || type.Op() == kOpEnum;  // where the archive is older than the field
+    Write(out, "$type$ $name$$initialiser$;\n", "type"_ = TypeView(field.m_type), "name"_ = field.m_name,
+          "initialiser"_ = If(isIndeterminate && def.WantsCompilableText(), "{}"));
   }
   if (field.m_rsnAdded != def.m_firstRsn) {
     Write(

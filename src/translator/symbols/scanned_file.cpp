@@ -76,6 +76,18 @@ std::string ScannedFile::ImportHint(const std::string& path) const {
   return text;
 }
 
+std::string ScannedFile::UseHint(const ScannedFile& imported) const {
+  const Project& user = *file.project;
+  const Project& used = *imported.file.project;
+  std::string text = file.path + " imports it";
+  if (!used.usesQrex) text += "; write qrex in " + used.filePath + ", or #include it";
+  const auto isUsed = [&](const std::string& path) { return user.workspace->FindSubproject(path) == &used; };
+  if (&user != &used && std::none_of(user.subprojects.begin(), user.subprojects.end(), isUsed)) {
+    text += "; write \"" + used.rootToProjDir + "\" in subproj { } of " + user.filePath + ", and it is built first";
+  }
+  return text;
+}
+
 void ScannedFile::ForgetTranslation() {
   registerNames.clear();
   unregisterNames.clear();

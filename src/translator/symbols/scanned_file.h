@@ -62,6 +62,7 @@ class ScannedFile {
 
   ProjectFile* ResolveImport(const std::string& path) const;  // or null
   std::string ImportHint(const std::string& path) const;      // where it was looked for, see Hint
+  std::string UseHint(const ScannedFile& imported) const;     // of an import that is found and can't be used
   std::string SourcePath() const;
   void ForgetTranslation();  // what the one before has found, ahead of the next
   // The source position of a 1-based line of the generated text; false (with a message to `trace`) when there is none.

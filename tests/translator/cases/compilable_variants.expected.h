@@ -76,10 +76,16 @@ class V
         new (_data) text(_rhs);
     }
     V(V const& _rhs);
+    V(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value);
     ~V();
     V& operator=(V const& _rhs)
     {
-        if (this != &_rhs) { this->~V(); new (this) V(_rhs); }
+        if (this != &_rhs) { V _value(_rhs); this->~V(); new (this) V(std::move(_value)); }
+        return *this;
+    }
+    V& operator=(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value)
+    {
+        if (this != &_rhs) { V _value(std::move(_rhs)); this->~V(); new (this) V(std::move(_value)); }
         return *this;
     }
     void VisitObjects(vesk::IObjectVisitor&) const;
@@ -105,6 +111,7 @@ class V
     bool is(E*) const { return _tag == 1; }
     bool is(none*) const { return _tag == 2; }
     bool is(text*) const { return _tag == 3; }
+    V(vesk::int32 _new,vesk::NullInterface);
     vesk::int32 _tag;
     vesk::octet_t _data[VESK_MAX4(sizeof(vesk::int32),sizeof(E),sizeof(none),sizeof(text))];
 };
@@ -134,6 +141,31 @@ inline V::~V()
         case 2 : as<none >().~none(); break;
         case 3 : as<text >().~text(); break;
     }
+}
+inline V::V(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value)
+{
+    const vesk::int32 _new = _rhs._tag;
+    _tag = -1;
+    switch(_new)
+    {
+        case 0 : new (_data) vesk::int32(std::move(_rhs.as<vesk::int32 >())); break;
+        case 1 : new (_data) E(std::move(_rhs.as<E >())); break;
+        case 2 : new (_data) none(std::move(_rhs.as<none >())); break;
+        case 3 : new (_data) text(std::move(_rhs.as<text >())); break;
+    }
+    _tag = _new;
+}
+inline V::V(vesk::int32 _new,vesk::NullInterface)
+{
+    _tag = -1;
+    switch(_new)
+    {
+        case 0 : new (_data) vesk::int32(); break;
+        case 1 : new (_data) E(); break;
+        case 2 : new (_data) none(); break;
+        case 3 : new (_data) text(); break;
+    }
+    _tag = _new;
 }
 inline bool V::operator==(V const& _rhs) const
 {
@@ -190,15 +222,17 @@ template<typename Archive> inline void V::Serialise(Archive& _ar) const
 }
 template<typename Archive> inline void V::Deserialise(Archive& _ar)
 {
-    this->~V();
-    vesk::DeserialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
+    vesk::int32 _new;
+    vesk::DeserialiseVariableLengthUint(_ar,_new);
+    V _value(_new,vesk::null);
+    switch(_new)
     {
-        case 0 : new (_data) vesk::int32(); _ar >> as<vesk::int32 >(); break;
-        case 1 : new (_data) E(); _ar >> as<E >(); break;
-        case 2 : new (_data) none(); as<none >().Deserialise(_ar); break;
-        case 3 : new (_data) text(); as<text >().Deserialise(_ar); break;
+        case 0 : _ar >> _value.as<vesk::int32 >(); break;
+        case 1 : _ar >> _value.as<E >(); break;
+        case 2 : _value.as<none >().Deserialise(_ar); break;
+        case 3 : _value.as<text >().Deserialise(_ar); break;
     }
+    *this = std::move(_value);
 }
 
 namespace vesk
@@ -329,7 +363,12 @@ struct S
     }
     N& operator=(N const& _rhs)
     {
-        if (this != &_rhs) { this->~N(); new (this) N(_rhs); }
+        if (this != &_rhs) { N _value(_rhs); this->~N(); new (this) N(std::move(_value)); }
+        return *this;
+    }
+    N& operator=(N&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::string8 >::value)
+    {
+        if (this != &_rhs) { N _value(std::move(_rhs)); this->~N(); new (this) N(std::move(_value)); }
         return *this;
     }
     vesk::int32 GetTag() const { return _tag; }
@@ -353,6 +392,27 @@ struct S
             case 1 : { typedef vesk::string8 _Item; as<vesk::string8 >().~_Item(); } break;
             case 2 : delete *(far**)_data; break;
         }
+    }
+    N(N&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::string8 >::value)
+    {
+        const vesk::int32 _new = _rhs._tag;
+        _tag = -1;
+        switch(_new)
+        {
+            case 1 : new (_data) vesk::string8(std::move(_rhs.as<vesk::string8 >())); break;
+            case 2 : *(far**)_data = *(far**)_rhs._data; _rhs._tag = -1; break;
+        }
+        _tag = _new;
+    }
+    N(vesk::int32 _new,vesk::NullInterface)
+    {
+        _tag = -1;
+        switch(_new)
+        {
+            case 1 : new (_data) vesk::string8(); break;
+            case 2 : *(far**)_data = new far(); break;
+        }
+        _tag = _new;
     }
     bool operator==(N const& _rhs) const
     {
@@ -402,13 +462,15 @@ struct S
     }
     template<typename Archive> void Deserialise(Archive& _ar)
     {
-        this->~N();
-        vesk::DeserialiseVariableLengthUint(_ar,_tag);
-        switch(_tag)
+        vesk::int32 _new;
+        vesk::DeserialiseVariableLengthUint(_ar,_new);
+        N _value(_new,vesk::null);
+        switch(_new)
         {
-            case 1 : new (_data) vesk::string8(); _ar >> as<vesk::string8 >(); break;
-            case 2 : *(far**)_data = new far(); as<far >().Deserialise(_ar); break;
+            case 1 : _ar >> _value.as<vesk::string8 >(); break;
+            case 2 : _value.as<far >().Deserialise(_ar); break;
         }
+        *this = std::move(_value);
     }
     private:
     template<typename _T> typename _T::Value const& as(_T*) const { vxAssert(is<_T>()); return *(typename _T::Value const*)_data; }
@@ -448,7 +510,7 @@ public:
     void bool_type_mem_fn() const {}
     operator bool_type() const { return m_stubFn ? &G::bool_type_mem_fn : 0; }
     G& operator=(vesk::NullInterface) { m_self = nullptr; m_stubFn = nullptr; return *this; }
-    void operator()() { m_stubFn(m_self); }
+    void operator()() { if (!m_stubFn) throw std::logic_error("call of a null G"); m_stubFn(m_self); }
     void write(vesk::xostream& os) const { os << "G(" << m_self << ',' << (void*)m_stubFn << ')'; }
 private:
     void* m_self;

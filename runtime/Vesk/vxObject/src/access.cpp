@@ -2,6 +2,8 @@
 
 @import "Vesk/vxObject/ValueTypes.h"
 
+#include <charconv>
+
 namespace vesk {
 
 struct Value::Owner {
@@ -18,7 +20,9 @@ Value::Value(ReflectedClass const& record, void* object)
     : m_types(std::make_shared<ValueTypes>()), m_type(&m_types->Of(record)), m_address(object) {}
 
 Value::Value(ReflectedType const& type, void* address)
-    : m_types(std::make_shared<ValueTypes>()), m_type(&m_types->Of(type)), m_address(address) {}
+    : m_types(std::make_shared<ValueTypes>()), m_type(&m_types->Of(type)), m_address(address) {
+  if (!m_type->m_forgotten.empty()) throw AccessError(NotRegistered("class", m_type->m_forgotten));
+}
 
 EValueKind Value::Kind() const { return m_address ? m_type->m_kind : VK_NONE; }
 
@@ -106,27 +110,41 @@ void Value::Each(EachFunction const& each) const {
 Value Value::At(ssize_t position) const {
   if (position < 0 || position >= Count()) throw AccessError("no such position");
   if (m_type->m_kind == VK_CLASS) return FieldAt(position);
-  ssize_t left = position;
-  Value found;
-  EachEntry(*m_type, m_address, [&](void* entry) {
-    if (left-- > 0) return true;
-    found = EntryAt(position, entry);
-    return false;
-  });
-  return found;
+  return EntryAt(position, EntryOf(*m_type, m_address, position));
 }
 
 xstring Value::Name(ssize_t position) const {
   if (position < 0 || position >= Count()) throw AccessError("no such position");
-  if (m_type->m_kind == VK_LIST) return vxMakeString(position);
   if (m_type->m_kind == VK_CLASS) return m_types->FieldsOf(*m_type)[position].m_name;
-  xstring name;
-  EachEntry(*m_type, m_address, [&](void* entry) {
-    if (position-- > 0) return true;
-    name = EntryName(0, entry);
-    return false;
-  });
-  return name;
+  return EntryName(position, EntryOf(*m_type, m_address, position));
+}
+
+bool Value::IsNamed(void* entry, std::string_view name) const {
+  ValueType const& key = m_type->m_key ? *m_type->m_key : *m_type->m_item;
+  if (key.m_code == RC_STRING8) return *static_cast<string8 const*>(entry) == name;
+  return EntryName(0, entry) == name;
+}
+
+Value Value::FindChild(std::string_view name) const {
+  const EValueKind kind = Kind();
+  Value found;
+  if (kind == VK_CLASS) {
+    xvector<ValueField> const& fields = m_types->FieldsOf(*m_type);
+    const auto field = std::find_if(fields.begin(), fields.end(), [name](auto const& f) { return f.m_name == name; });
+    if (field != fields.end()) found = FieldAt(field - fields.begin());
+  } else if (kind == VK_LIST) {
+    ssize_t position = -1;
+    std::from_chars(name.data(), name.data() + name.size(), position);
+    if (position >= 0 && position < Count() && vxMakeString(position) == name) found = At(position);
+  } else if (kind == VK_SET || kind == VK_MAP) {
+    ssize_t position = 0;
+    EachEntry(*m_type, m_address, [&](void* entry) {
+      if (!IsNamed(entry, name)) return ++position > 0;
+      found = EntryAt(position, entry);
+      return false;
+    });
+  }
+  return found;
 }
 
 Value Value::Find(std::string_view path) const {
@@ -136,7 +154,7 @@ Value Value::Find(std::string_view path) const {
     std::string_view name;
     if (path[0] == '[') {
       end = path.find(']');
-      if (end == std::string_view::npos) throw AccessError("] expected: " + std::string(path));
+      if (end == std::string_view::npos) return Value();
       name = path.substr(1, end++ - 1);
     } else {
       if (path[0] == '.') path.remove_prefix(1);
@@ -144,12 +162,7 @@ Value Value::Find(std::string_view path) const {
       name = path.substr(0, end);
     }
     path.remove_prefix(end);
-    Value found;
-    at.Each([&](xstring const& each, Value const& value) {
-      if (each == name) found = value;
-      return each != name;
-    });
-    at = found;
+    at = at.FindChild(name);
   }
   return at;
 }

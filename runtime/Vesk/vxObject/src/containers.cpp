@@ -306,6 +306,18 @@ void EachEntry(ValueType const& type, void* container, std::function<bool(void*)
   WithAlign<SetView>(type, container, walk);
 }
 
+void* EntryOf(ValueType const& type, void* container, ssize_t position) {
+  if (IsBits(type)) return container;
+  if (IsSideBySide(type.m_code)) return FirstOf(type, container) + position * type.m_item->m_size;
+  if (type.m_code == RC_DEQUE) return DequeOpsFor(type).m_at(container, position);
+  void* found = nullptr;
+  EachEntry(type, container, [&](void* entry) {
+    found = entry;
+    return position-- > 0;
+  });
+  return found;
+}
+
 void MakeContainer(ValueType const& type, void* container) {
   auto make = [](auto& view) { new (&view) std::decay_t<decltype(view)>(); };
   switch (type.m_code) {

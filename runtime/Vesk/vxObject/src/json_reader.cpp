@@ -11,7 +11,7 @@ namespace {
 class JsonReader {
  public:
   JsonReader(ValueTypes& types, std::string_view text, JsonLimits const& limits)
-      : m_types(types), m_scanner(text), m_limits(limits) {
+      : m_types(types), m_scanner(text), m_limits(limits), m_memory(limits.m_memory) {
     if (text.size() > limits.m_bytes) throw JsonError(vxMakeString("text of " << text.size() << " bytes"));
     m_scanner.Check(limits.m_depth);
   }
@@ -37,16 +37,15 @@ class JsonReader {
 
  private:
   struct Object {
-    ReflectedClass const* m_record;
-    void* m_self;
+    ReflectedClass const* m_record = nullptr;
+    void* m_self = nullptr;
     ptr<IObject> m_object;  // null for a plain struct
   };
 
   // --- Tokens
 
   void Charge(std::size_t size, std::size_t count = 1) {
-    if (size > 0 && count > (m_limits.m_memory - m_memory) / size) m_scanner.Fail("more memory than is allowed");
-    m_memory += size * count;
+    if (!m_memory.Take(size, count)) m_scanner.Fail("more memory than is allowed");
   }
   void ExpectName(std::string_view name) {
     const std::size_t at = m_scanner.Here();
@@ -138,7 +137,7 @@ class JsonReader {
     if (type.m_code == RC_ARRAY) {
       if (count != type.m_count) m_scanner.FailAt(at, vxMakeString("expected " << type.m_count << " elements"));
     } else {
-      Charge(type.m_item->m_size + (type.m_code == RC_LIST ? 16 : 0), static_cast<std::size_t>(count));
+      Charge(JsonMemory::OfElement(type), static_cast<std::size_t>(count));
       ResizeList(type, list, count);
     }
     m_scanner.Expect('[');
@@ -155,7 +154,7 @@ class JsonReader {
   }
 
   void* Insert(ValueType const& type, void* container, std::size_t at, ValueFunction const& fill) {
-    Charge(type.EntrySize() + 32);
+    Charge(JsonMemory::OfEntry(type));
     void* const entry = InsertEntry(type, container, fill);
     if (!entry) m_scanner.FailAt(at, type.m_key ? "repeated key" : "repeated element");
     return entry;
@@ -357,28 +356,31 @@ class JsonReader {
 
   void Make(xstring const& name, std::size_t at) {
     ReflectedClass const* record = Find<ReflectedClass>(name);
-    const bool isObject = record && record->m_objectTable;
-    if (!record || !(isObject ? record->m_create != nullptr : record->m_ops.m_construct && record->m_ops.m_destruct)) {
+    if (!record) m_scanner.FailAt(at, NotRegistered("class", name));
+    const bool isObject = record->m_objectTable;
+    if (!(isObject ? record->m_create != nullptr : record->m_ops.m_construct && record->m_ops.m_destruct)) {
       m_scanner.FailAt(at, "no class to create: " + name);
     }
     if (m_limits.m_allow && !m_limits.m_allow(*record)) m_scanner.FailAt(at, "class is not allowed: " + name);
     Charge(record->m_size);
+    Object& object = m_objects.emplace_back();  // so that no object is without its place
     if (isObject) {
-      const ptr<IObject> object = record->m_create();
-      m_objects.push_back({record, object.Object(), object});
+      object.m_object = record->m_create();
+      object.m_self = object.m_object.Object();
     } else {
-      void* const memory = ::operator new(record->m_size);
+      object.m_self = ::operator new(record->m_size);
       try {
-        record->m_ops.m_construct(memory, 0, 1);
+        record->m_ops.m_construct(object.m_self, 0, 1);
       } catch (...) {
-        ::operator delete(memory);
+        ::operator delete(std::exchange(object.m_self, nullptr));
         throw;
       }
-      m_objects.push_back({record, memory, ptr<IObject>()});
     }
+    object.m_record = record;
   }
 
   static void Destroy(Object const& object) {
+    if (!object.m_self) return;
     if (object.m_object) return object.m_object->DestroyObject();
     object.m_record->m_ops.m_destruct(object.m_self, 0, 1);
     ::operator delete(object.m_self);
@@ -459,7 +461,7 @@ class JsonReader {
   ValueTypes& m_types;
   JsonScanner m_scanner;
   JsonLimits const& m_limits;
-  std::size_t m_memory = 0;
+  JsonMemory m_memory;
   xvector<Object> m_objects;
   std::size_t m_reader = 0;                                   // the object that is read, by number; 0 for the value
   xvector<std::pair<std::size_t, std::size_t>> m_references;  // who leads to what

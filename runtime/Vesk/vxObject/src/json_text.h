@@ -10,6 +10,28 @@ constexpr char kHexDigits[] = "0123456789abcdef";
 // The length of the UTF-8 sequence that the text begins with; 0 when it is none.
 std::size_t Utf8Length(std::string_view text);
 
+// What a value takes of JsonLimits::m_memory, counted alike by who reads and who writes it.
+class JsonMemory {
+ public:
+  explicit JsonMemory(std::size_t limit) : m_limit(limit) {}
+  // Whether there was as much.
+  bool Take(std::size_t size, std::size_t count = 1) {
+    if (size > 0 && count > (m_limit - m_taken) / size) return false;
+    m_taken += size * count;
+    return true;
+  }
+  void Reset() { m_taken = 0; }
+  // For an element of a list, for an entry of a set or map.
+  static std::size_t OfElement(ValueType const& list) {
+    return list.m_item->m_size + (list.m_code == RC_LIST ? 16 : 0);
+  }
+  static std::size_t OfEntry(ValueType const& container) { return container.EntrySize() + 32; }
+
+ private:
+  std::size_t m_limit;
+  std::size_t m_taken = 0;
+};
+
 // In quotes, with escapes. Bytes that are not UTF-8 become U+FFFD or throw.
 void PutJsonString(std::string& out, std::string_view text, bool replaceInvalid);
 void PutJsonString(std::string& out, std::u16string_view text);

@@ -13,13 +13,17 @@ namespace {
 
 class JsonWriter {
  public:
-  JsonWriter(ValueTypes& types, JsonStyle const& style) : m_types(types), m_style(style) {}
+  JsonWriter(ValueTypes& types, JsonStyle const& style, JsonLimits const& limits)
+      : m_types(types), m_style(style), m_limits(limits), m_memory(limits.m_memory) {}
 
   xstring Write(ValueType const& type, void* address) {
     Put(type, address);
+    CheckSize();
     if (m_objects.empty()) return std::move(m_text);
-    if (m_style.m_indent > 0) {  // it stands one level deeper
+    CheckDepth(m_deepest + 1);  // it stands one level deeper
+    if (m_style.m_indent > 0) {
       m_text.clear();
+      m_memory.Reset();
       m_depth = 1;
       Put(type, address);
     }
@@ -36,6 +40,7 @@ class JsonWriter {
     PutName("$value");
     m_text += value;
     Close('}');
+    CheckSize();
     return std::move(m_text);
   }
 
@@ -47,8 +52,21 @@ class JsonWriter {
 
   // --- Structure
 
+  void CheckSize() const {
+    if (m_text.size() > m_limits.m_bytes) {
+      throw JsonError(vxMakeString("text of more than " << m_limits.m_bytes << " bytes"));
+    }
+  }
+  void CheckDepth(int depth) const {
+    if (depth > m_limits.m_depth) throw JsonError("value nested too deeply");
+  }
+  void Charge(std::size_t size, std::size_t count = 1) {
+    if (!m_memory.Take(size, count)) throw JsonError("value takes more memory than is allowed");
+  }
+
   void Open(char bracket) {
-    if (++m_depth > kJsonDepth) throw JsonError("value nested too deeply");
+    CheckDepth(++m_depth);
+    m_deepest = std::max(m_deepest, m_depth);
     m_text += bracket;
     m_isFirst = true;
   }
@@ -61,6 +79,7 @@ class JsonWriter {
   void Next() {
     if (!std::exchange(m_isFirst, false)) m_text += ',';
     NewLine();
+    CheckSize();
   }
   void NewLine() {
     if (m_style.m_indent <= 0) return;
@@ -143,9 +162,13 @@ class JsonWriter {
 
   void PutText(ValueType const& type, void* address) {
     if (type.m_code == RC_STRING8) {
-      PutJsonString(m_text, *static_cast<string8*>(address), m_style.m_replaceInvalid);
+      string8 const& text = *static_cast<string8*>(address);
+      Charge(text.size());
+      PutJsonString(m_text, text, m_style.m_replaceInvalid);
     } else {
-      PutJsonString(m_text, std::u16string_view(*static_cast<string16*>(address)));
+      string16 const& text = *static_cast<string16*>(address);
+      Charge(text.size(), sizeof(char16));
+      PutJsonString(m_text, std::u16string_view(text));
     }
   }
 
@@ -172,9 +195,12 @@ class JsonWriter {
   }
 
   void PutList(ValueType const& type, void* container) {
+    const bool isSet = type.m_kind == VK_SET;
+    if (!isSet && type.m_code != RC_ARRAY) Charge(JsonMemory::OfElement(type), CountOf(type, container));
     Open('[');
     EachEntry(type, container, [&](void* element) {
       Next();
+      if (isSet) Charge(JsonMemory::OfEntry(type));
       Put(*type.m_item, element);
       return true;
     });
@@ -185,6 +211,7 @@ class JsonWriter {
     Open('{');
     EachEntry(type, map, [&](void* entry) {
       Next();
+      Charge(JsonMemory::OfEntry(type));
       PutKey(*type.m_key, entry);
       m_text += m_style.m_indent > 0 ? ": " : ":";
       Put(*type.m_item, type.ItemOf(entry));
@@ -197,6 +224,7 @@ class JsonWriter {
     if (type.m_kind == VK_TEXT) {
       const std::string text =
           type.m_code == RC_STRING8 ? *static_cast<string8*>(key) : Utf8Text(*static_cast<string16*>(key));
+      Charge(text.size());
       return PutJsonString(m_text, (text.empty() || text[0] != '$' ? "" : "$") + text, m_style.m_replaceInvalid);
     }
     const std::size_t begin = m_text.size();
@@ -210,6 +238,7 @@ class JsonWriter {
     Open('[');
     EachEntry(type, map, [&](void* entry) {
       Next();
+      Charge(JsonMemory::OfEntry(type));
       Open('[');
       Next();
       Put(*type.m_key, entry);
@@ -302,10 +331,12 @@ class JsonWriter {
       record = ptr<IObject>(*static_cast<void**>(reference), record->m_objectTable)->GetReflectedClass();
     }
     if (!record) throw JsonError("object without a record behind a reference to " + type.m_target);
+    if (!Find<ReflectedClass>(record->m_name)) throw JsonError(NotRegistered("class", record->m_name));
     return record;
   }
 
   void PutObject(Object object) {
+    Charge(object.m_record->m_size);
     Open('{');
     PutName("$class");
     PutJsonString(m_text, object.m_record->m_name, false);
@@ -315,8 +346,11 @@ class JsonWriter {
 
   ValueTypes& m_types;
   JsonStyle const& m_style;
+  JsonLimits const& m_limits;
+  JsonMemory m_memory;
   std::string m_text;
   int m_depth = 0;
+  int m_deepest = 0;
   bool m_isFirst = true;
   xvector<Object> m_objects;
   std::unordered_map<void*, std::size_t> m_numbers;
@@ -324,10 +358,10 @@ class JsonWriter {
 
 }  // namespace
 
-xstring ToJson(Value const& value, JsonStyle const& style) {
+xstring ToJson(Value const& value, JsonStyle const& style, JsonLimits const& limits) {
   ValueType const& type = value.Type();
   try {
-    return JsonWriter(*value.Types(), style).Write(type, value.Address());
+    return JsonWriter(*value.Types(), style, limits).Write(type, value.Address());
   } catch (ArchiveError const& error) {  // of a variant
     throw JsonError(error.what());
   }

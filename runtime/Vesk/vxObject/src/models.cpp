@@ -114,33 +114,4 @@ void ModelHook::Notify(ModelChange const& change) {
   }
 }
 
-// --- Releases
-
-void WriteRsn(XTarget const& target, Archive& ar) { SerialiseVariableLengthUint(ar, target.m_rsn); }
-
-void ReadRsn(XTarget const& target, InputArchive& ar) {
-  const RSN release = ReadCompact(ar);
-  if (release > target.m_rsn) {
-    throw ArchiveError(vxMakeString("archive of release " << release << ", this is release " << target.m_rsn));
-  }
-  auto at = ar.m_releases.begin();
-  while (at != ar.m_releases.end() && at->first != &target) ++at;
-  if (at == ar.m_releases.end()) at = ar.m_releases.insert(at, {&target, release});
-  at->second = release;
-  // A class that is not read by `>>`: its model asks next.
-  if (t_reading.m_archive != &ar) {
-    t_reading.m_target = &target;
-    t_reading.m_release = release;
-  }
-}
-
-RSN ReleaseBeingRead(XTarget const& target) {
-  if (std::exchange(t_reading.m_target, nullptr) == &target) return t_reading.m_release;
-  if (!t_reading.m_archive) return target.m_rsn;
-  for (auto const& [project, release] : t_reading.m_archive->m_releases) {
-    if (project == &target) return release;
-  }
-  return target.m_rsn;
-}
-
 }  // namespace vesk

@@ -106,11 +106,39 @@ bool ListsInterface(ReflectedClass const& record, ConstStringZ name) {
   return std::any_of(record.m_interfaces, end, [name](ConstStringZ other) { return std::strcmp(name, other) == 0; });
 }
 
-void ReadObjectMark(InputArchive& ar) {
-  if (ar.Remaining() == 0 || ar.m_bytes[ar.m_position] != ObjectMark[0]) return;
-  octet_t const* mark = ar.Take(sizeof(ObjectMark));
-  if (!std::equal(mark, mark + 3, ObjectMark)) throw ArchiveError("not the archive of an object");
-  if (mark[3] > ObjectMark[3]) throw ArchiveError("archive in a later form than is known here");
+ReflectedClass const* ClassOf(ptr<IPersistable> const& object) {
+  return object ? object->GetReflectedClass() : nullptr;
+}
+
+NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedClass const&)> const& fits) {
+  xstring name;
+  ar >> name;
+  ReflectedClass const* record = Find<ReflectedClass>(name);
+  if (!record) throw ArchiveError(NotRegistered("class", name));
+  if (!record->m_create) throw ArchiveError("no class to create: " + name);
+  if (!fits(*record) || !ListsInterface(*record, GetReflectedInterface<IPersistable>().m_name)) {
+    throw ArchiveError("not the class of the reference: " + name);
+  }
+  if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
+  const ptr<IObject> whole = record->m_create();
+  const ptr<IPersistable> made = QueryInterface<IPersistable>(whole);
+  if (!made) {
+    whole->DestroyObject();
+    throw ArchiveError("not persistable: " + name);
+  }
+  NumberedObject object;
+  object.m_self = made.Object();
+  object.m_persistable = made.Any();
+  object.m_type = &typeid(void);
+  object.m_read = [](InputArchive& input, NumberedObject const& o) {
+    ptr<IPersistable>(o.m_persistable)->Deserialise(input);
+  };
+  object.m_forget = [](NumberedObject const& o) {
+    ReferenceCleaner cleaner;
+    ptr<IPersistable>(o.m_persistable)->VisitPrefs(cleaner);
+  };
+  object.m_destroy = [](NumberedObject const& o) { ptr<IPersistable>(o.m_persistable)->DestroyObject(); };
+  return object;
 }
 
 // --- The heap

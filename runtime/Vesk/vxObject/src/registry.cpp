@@ -3,7 +3,31 @@
 @import "Vesk/vxObject/Registry.h"
 @import "shared.h"
 
+#include <cstring>
+#include <mutex>
+
 namespace vesk {
+
+// --- Projects
+
+struct Targets {
+  std::mutex m_mutex;
+  xvector<XTarget const*> m_list;
+};
+
+XTarget::XTarget(ConstStringZ name, RSN rsn) : m_name(name), m_rsn(rsn) {
+  Targets& targets = Shared<Targets>();
+  std::lock_guard<std::mutex> lock(targets.m_mutex);
+  targets.m_list.push_back(this);
+}
+
+xvector<XTarget const*> AllTargets() {
+  Targets& targets = Shared<Targets>();
+  std::lock_guard<std::mutex> lock(targets.m_mutex);
+  return targets.m_list;
+}
+
+// --- Records
 
 template <typename R>
 struct RegisteredRecord {
@@ -25,6 +49,11 @@ NSE RegisterRecord(R const* record, XTarget* target) {
   }
   if (!records.empty() && LayoutText(*records.front().m_record) != LayoutText(*record)) return NSE_ALREADY_DEFINED;
   records.push_back({record, target});
+  if constexpr (std::is_same<R, ReflectedClass>::value) {
+    if (!target->m_latestModel || LastRelease(*target->m_latestModel) < LastRelease(*record)) {
+      target->m_latestModel = record;
+    }
+  }
   return NSE_OK;
 }
 
@@ -122,6 +151,11 @@ void UnregisterRecords(XTarget const* target) {
 }
 
 XTarget::~XTarget() {
+  {
+    Targets& targets = Shared<Targets>();
+    std::lock_guard<std::mutex> lock(targets.m_mutex);
+    targets.m_list.erase(std::find(targets.m_list.begin(), targets.m_list.end(), this));
+  }
   if (IsProcessEnding(this)) return;
   UnregisterTarget(this);
   auto& table = TypeOpsTable();
@@ -148,6 +182,33 @@ XTarget::~XTarget() {
   template xvector<R const*> All();                                                  \
   template XTarget* TargetOf(R const&);
 VESK_RECORD_KINDS(VESK_DEFINE)
+
+// A project that has records, and none of them is registered, is one whose registration was forgotten.
+template <typename R>
+bool HasRecords(XTarget const* target) {
+  auto const& table = RecordTable<R>();
+  return std::any_of(table.begin(), table.end(), [target](auto const& named) {
+    return std::any_of(named.second.begin(), named.second.end(),
+                       [target](RegisteredRecord<R> const& record) { return record.m_target == target; });
+  });
+}
+#define VESK_OR_HAS_RECORDS(R) || HasRecords<R>(target)
+
+xstring NotRegistered(std::string_view what, std::string const& name) {
+  xstring calls;
+  for (XTarget const* target : AllTargets()) {
+    if (false VESK_RECORD_KINDS(VESK_OR_HAS_RECORDS)) continue;
+    // The function has the name of the project, which is that of its folder, but for what stands around that.
+    const bool isNested = std::strchr(target->m_name, '_');
+    calls += calls.empty() ? "" : " or ";
+    calls += vxMakeString((isNested ? "the Register_Project_ function of " : "Register_Project_")
+                          << target->m_name << (isNested ? "" : "()"));
+  }
+  xstring text = vxMakeString(what << " is not registered");
+  if (!name.empty()) text += ": " + name;
+  if (!calls.empty()) text += " (call " + calls + " first)";
+  return text;
+}
 
 #define VESK_UNREGISTER(R) UnregisterRecords<R>(target);
 void UnregisterTarget(XTarget const* target) { VESK_RECORD_KINDS(VESK_UNREGISTER) }

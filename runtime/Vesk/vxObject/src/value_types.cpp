@@ -120,7 +120,8 @@ void ValueTypes::Resolve(ValueType& type, ReflectedType const& plain) {
     default:
       return SetOps(type, *FindTypeOps(plain));
   }
-  type.m_kind = VK_NONE;  // not registered
+  type.m_kind = VK_NONE;
+  type.m_forgotten = plain.m_name;
 }
 
 void ValueTypes::ResolveContainer(ValueType& type, ReflectedType const& plain) {
@@ -128,6 +129,7 @@ void ValueTypes::ResolveContainer(ValueType& type, ReflectedType const& plain) {
   if (type.m_kind == VK_MAP) type.m_key = &Of(plain.m_inner.front());
   if (type.m_item->m_size == 0 || (type.m_key && type.m_key->m_size == 0)) {
     type.m_kind = VK_NONE;
+    type.m_forgotten = type.m_key && type.m_key->m_size == 0 ? type.m_key->m_forgotten : type.m_item->m_forgotten;
     return;
   }
   switch (type.m_code) {

@@ -45,6 +45,9 @@ void CheckReadClasses();
 void CheckHeap();
 void CheckTexts();
 void CheckCopies();
+void CheckOwnParts();
+void CheckProjects();
+void CheckForgotten();
 
 // Goes when statics of the library might be gone.
 struct Last
@@ -68,11 +71,13 @@ int main()
                        CheckJsonBothWays, CheckJsonErrors, CheckJsonObjects, CheckAccess, CheckGraph, CheckCaches,
                        CheckCachesInTemplates, CheckVisiting, CheckEvictions, CheckWritesInside, CheckErrorsInside,
                        CheckFields, CheckChains, CheckManyLinks, CheckManyWrites, CheckGraphThreads, CheckLinkedObjects,
-                       CheckReadClasses, CheckHeap, CheckTexts, CheckCopies})
+                       CheckReadClasses, CheckHeap, CheckTexts, CheckCopies,
+                       CheckOwnParts, CheckProjects})
     {
         check();
     }
     Unregister_Project_check();
+    CheckForgotten();
     CHECK(vesk::Find<vesk::ReflectedClass>("Linked") == nullptr, true);
     std::printf("%d checks, %d failures\n", g_checks, g_failures);
     return g_failures > 0;

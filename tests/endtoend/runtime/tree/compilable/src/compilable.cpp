@@ -1,6 +1,6 @@
 @import "compilable/src/row.h"
 
-vxDefineTarget(compilable, 1)
+vxDefineTarget(compilable, 4)
 void Register_Project_compilable();
 
 int main()
