@@ -39,9 +39,14 @@ template <typename N, typename K>
 class DGNodeMap {
  public:
   N& operator[](K const& key) {
-    const auto [at, isNew] = m_nodes.try_emplace(key);
-    if (isNew) at->second.m_key = &at->first;
-    return at->second;
+    try {
+      const auto [at, isNew] = m_nodes.try_emplace(key);
+      if (isNew) at->second.m_key = &at->first;
+      return at->second;
+    } catch (...) {
+      GraphState::Get().LoseInput();
+      throw;
+    }
   }
   ssize_t size() const { return static_cast<ssize_t>(m_nodes.size()); }
   typename std::map<K, N>::const_iterator begin() const { return m_nodes.begin(); }
@@ -117,10 +122,11 @@ class DGAsyncNode : public DGNode {
   virtual bool CalculateOutput() const = 0;  // whether it changed
   void Enqueue() const {
     if (IsWaiting()) return;
-    m_queues = &Queues::Get();
-    m_queues->Use();
-    std::list<DGAsyncNode const*>& waiting = m_queues->m_waiting[OwnQueue()];
+    Queues& queues = Queues::Get();
+    std::list<DGAsyncNode const*>& waiting = queues.m_waiting[OwnQueue()];
     m_place = waiting.insert(waiting.end(), this);
+    m_queues = &queues;
+    queues.Use();
   }
 
  private:

@@ -56,9 +56,15 @@ class xvector : public Assignable<std::vector<T>> {
   using base::insert;
   xvector() {}
   xvector(base const& items) : Assignable<base>(items) {}
-  void erase(ssize_t first, ssize_t count) { base::erase(base::begin() + first, base::begin() + first + count); }
+  // Both throw std::out_of_range: a hook may have taken the position away since it was asked for.
+  void erase(ssize_t first, ssize_t count) {
+    const ssize_t size = static_cast<ssize_t>(base::size());
+    if (first < 0 || count < 0 || first > size - count) throw std::out_of_range("elements to erase");
+    base::erase(base::begin() + first, base::begin() + first + count);
+  }
   // The items may be its own.
   iterator insert(const_iterator at, T const* first, T const* last) {
+    if (at - base::cbegin() > base::cend() - base::cbegin()) throw std::out_of_range("position to insert at");
     if (last - first == 1) return base::insert(at, *first);
     if (!IsOwn(first)) return base::insert(at, first, last);
     const base items(first, last);

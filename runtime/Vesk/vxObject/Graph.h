@@ -13,11 +13,11 @@
 
 namespace vesk {
 
-class DGNode {
+class DGNode : private QueuePlace, private ChangePlace {
  public:
   explicit DGNode(int flags = 0) : m_flags(flags) {}
   // A copy of an object calculates for itself; an assigned one has changed.
-  DGNode(DGNode const& rhs) : m_flags(rhs.m_flags) {}
+  DGNode(DGNode const& rhs) : QueuePlace(), ChangePlace(), m_flags(rhs.m_flags) {}
   DGNode& operator=(DGNode const&) {
     m_isNews = true;
     Invalidate(true);
@@ -40,12 +40,8 @@ class DGNode {
   // What reads the value calls first. GraphError where the value depends on itself.
   void ReadBarrier() const {
     GraphState& state = GraphState::Get();
+    if (m_state != EState::Clean) BringUpToDate(state);
     DGNode const* reader = state.m_calculation ? state.m_calculation->m_node : nullptr;
-    if (m_state != EState::Clean) {
-      FailedRead failed{state, this, reader};
-      BringUpToDate(state);
-      failed.m_reader = nullptr;
-    }
     if (reader && reader != this) Link(state);
   }
 
@@ -64,14 +60,21 @@ class DGNode {
   void Invalidate(bool hard) const;
   // What depends on this node looks at it again.
   void InvalidateDependents() const;
+  typedef NodeList<ChangePlace> Changes;
   // What depends on one of these nodes calculates again. Until then it needs no inputs, so that the next change has
-  // nothing to do. A source among them that nobody else reads is gone afterwards.
-  static void Change(xvector<DGNode const*> const& nodes);
+  // nothing to do. The list is empty afterwards.
+  static void Change(Changes& nodes);
   void Change() const {
     if (!m_dependents.empty()) TellDependents();
   }
 
-  // Makes the node that is being calculated depend on this one.
+  static DGNode const* Changed(NodePlace const* place) {
+    return static_cast<DGNode const*>(static_cast<ChangePlace const*>(place));
+  }
+  void Join(Changes& changes) const { changes.Append(*this); }
+
+  // Makes the node that is being calculated depend on this one. Where there is no memory for that, its value is not
+  // kept.
   void Link(GraphState& state) const;
   void UpdateByteSize() const;
   virtual void OnNoDependents() const {}
@@ -84,13 +87,8 @@ class DGNode {
   friend struct GraphState;
   friend struct Calculation;
 
-  // A reader that goes on without the value has still read it: it must look again when that may be there.
-  struct FailedRead {
-    ~FailedRead();
-    GraphState& m_state;
-    DGNode const* m_node;
-    DGNode const* m_reader;
-  };
+  enum class EAgain : unsigned char { No, Soft, Hard };
+  struct FailedRead;
 
   // One end of a link: the node at the other end, and where that lists this one.
   struct NodeLink {
@@ -100,19 +98,25 @@ class DGNode {
   typedef xvector<NodeLink> Links;
 
   static xvector<DGNode const*> NodesOf(Links const& links);
+  static void MakeRoom(Links& links);
   void TellDependents() const;
 
   void BringUpToDate(GraphState& state) const;
+  void BeginRead(GraphState& state) const;
   void Evaluate(GraphState& state) const;
   void Update(GraphState& state) const;
+  void LookAtInputs(GraphState& state) const;
   void Calculate(GraphState& state) const;
   void Recalculate(GraphState& state) const;
 
-  void Mark(GraphState& state, bool hard, xvector<DGNode const*>& dirty) const;
-  static void Spread(GraphState& state, xvector<DGNode const*>& dirty);
+  void Mark(bool hard, Changes& dirty) const;
+  void CalculateAgain(EAgain again) const {
+    if (again > m_again) m_again = again;
+  }
+  static void Spread(GraphState& state, Changes& dirty);
 
   void Forget() const;
-  Links DropDependents() const;
+  void DropDependents(GraphState* state, Changes& dirty) const;
   static void Drop(Links& links, Links DGNode::*backwards, std::size_t at);
   void JoinQueue(GraphState& state) const;
   void LeaveQueue() const;
@@ -120,11 +124,12 @@ class DGNode {
   int m_flags;
   mutable bool m_isCalculating = false;
   mutable bool m_isEmpty = true;  // nothing to evict
+  mutable EAgain m_again = EAgain::No;  // whether what is being calculated must be calculated again, and how
   mutable ssize_t m_byteSize = 0;
   mutable Links m_inputs;  // in the order in which they were read
   mutable Links m_dependents;
   mutable EvictionQueue* m_queue = nullptr;  // where it is queued
-  mutable std::list<DGNode const*>::iterator m_queuePlace;
+  mutable std::size_t m_unwound = 0;         // the serial of the target that it waits for
 };
 
 // The node of a `$dep` field.

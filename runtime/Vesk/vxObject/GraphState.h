@@ -3,6 +3,7 @@
 
 @import "Vesk/vxObject/Visitors.h"
 #include <exception>
+#include <memory>
 #include <unordered_map>
 #include <unordered_set>
 
@@ -64,6 +65,45 @@ class PerThread {
   ssize_t m_users = 1;  // the thread is one
 };
 
+// A place in a list. To join one and to leave it takes no memory, so that neither fails; what is destroyed leaves.
+struct NodePlace {
+  NodePlace() {}
+  NodePlace(NodePlace const&) = delete;
+  void operator=(NodePlace const&) = delete;
+  ~NodePlace() { Leave(); }
+
+  void Leave() const {
+    m_previous->m_next = m_next;
+    m_next->m_previous = m_previous;
+    m_previous = m_next = this;
+  }
+  // Leaves the list where it is.
+  void JoinAhead(NodePlace const& place) const {
+    Leave();
+    m_next = &place;
+    m_previous = place.m_previous;
+    m_previous->m_next = m_next->m_previous = this;
+  }
+
+  mutable NodePlace const* m_previous = this;
+  mutable NodePlace const* m_next = this;
+};
+
+// A node stands in one list of each kind at a time.
+struct QueuePlace : NodePlace {};
+struct ChangePlace : NodePlace {};
+
+template <typename Place>
+struct NodeList : private NodePlace {
+  ~NodeList() {
+    while (!IsEmpty()) m_next->Leave();
+  }
+  bool IsEmpty() const { return m_next == this; }
+  NodePlace const* First() const { return m_next; }
+  NodePlace const* End() const { return this; }
+  void Append(Place const& place) { place.JoinAhead(*this); }
+};
+
 // The memory of a node's value, asked of the node's ByteSize: generated text passes the value on from there.
 struct ValuePlace {
   void const* m_begin = nullptr;
@@ -86,7 +126,7 @@ struct Calculation {
   Calculation(Calculation const&) = delete;
   void operator=(Calculation const&) = delete;
 
-  // Whether the node has not read this input yet.
+  // Whether the node has not read this input yet; from now on it has.
   bool IsNew(DGNode const* input);
   // The link from `input` to a node that is being calculated here or further out is gone.
   void Forget(DGNode const* node, DGNode const* input);
@@ -96,7 +136,7 @@ struct Calculation {
   DGNode const* m_node;
   GraphState& m_state;
   Calculation* m_outer;
-  std::unordered_set<DGNode const*> m_inputs;  // filled once there are many
+  std::unique_ptr<std::unordered_set<DGNode const*>> m_inputs;  // once there are many
   ValuePlace m_place;
   bool m_isPlaceKnown = false;
 };
@@ -107,7 +147,7 @@ class EvictionQueue {
   // That of the calling thread; index from 0 to 7.
   static EvictionQueue& Get(ssize_t index);
 
-  ssize_t Count() const { return static_cast<ssize_t>(m_nodes.size()); }
+  ssize_t Count() const { return m_count; }
   ssize_t ByteSize() const { return m_byteSize; }
 
   // Evicts the oldest values until the others hold at most `budget` bytes.
@@ -117,8 +157,9 @@ class EvictionQueue {
   friend class DGNode;
   friend struct GraphState;
   GraphState* m_state = nullptr;
-  std::list<DGNode const*> m_nodes;
-  std::list<DGNode const*>::iterator m_next = m_nodes.end();  // of the eviction that runs
+  NodeList<QueuePlace> m_nodes;
+  NodePlace const* m_next = m_nodes.End();  // of the eviction that runs
+  ssize_t m_count = 0;
   ssize_t m_byteSize = 0;
 };
 
@@ -137,7 +178,7 @@ struct GraphState : PerThread<GraphState> {
   };
   void Aim(DGNode const* node);
 
-  // The calculation of a node was unwound: it waits for the next target, until its own one begins again.
+  // A node whose calculation was unwound waits for the next target, until its own one begins again.
   void Unwind(DGNode const* node);
   bool IsWaiting(DGNode const* node) const;
 
@@ -145,13 +186,9 @@ struct GraphState : PerThread<GraphState> {
   // there.
   bool IsDeep() const;
 
-  // Lists of nodes that are being told: a node that is destroyed meanwhile leaves them.
-  struct NotifyScope {
-    NotifyScope(GraphState& state, xvector<DGNode const*>& nodes);
-    ~NotifyScope();
-    GraphState& m_state;
-  };
   void OnDestroy(DGNode const* node);
+  // The calculation that runs goes on without something that it wanted to read: its value is not to be kept.
+  void LoseInput();
 
   Calculation* m_calculation = nullptr;  // the innermost
   EvictionQueue m_queues[8];
@@ -162,10 +199,14 @@ struct GraphState : PerThread<GraphState> {
   DGNode const* m_deep = nullptr;  // the node of the DeepRead that is on its way
   xvector<Target> m_targets;
   std::size_t m_lastSerial = 0;
-  std::unordered_map<DGNode const*, std::size_t> m_unwound;  // and the serial of the target
+  // A node whose inputs are looked at, and which of them is next.
+  struct Step {
+    DGNode const* m_node;
+    std::size_t m_input;
+  };
+  xvector<Step> m_steps;
   std::unordered_map<DGNode const*, std::exception_ptr> m_failed;
   std::unordered_map<DGNode const*, bool> m_again;  // dirty when it ends, and whether hard
-  xvector<xvector<DGNode const*>*> m_notified;
 };
 
 }  // namespace vesk

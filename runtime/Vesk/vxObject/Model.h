@@ -120,8 +120,16 @@ void genop_OffsetValue(T* object, Path const& path, E& field, V const& value) {
 
 template <typename T, typename E, typename V>
 void genop_CreateIntoVector(T* object, Path const& path, E& field, ssize_t at, V const* source, ssize_t count) {
+  if (!ModelHook::Any()) {
+    BeginOperation(ModelChange::Insert, object, path);
+    field.insert(field.begin() + at, source, source + count);
+    return;
+  }
+  // A hook may change the field, of which the source may be a part, and take the position away.
+  const E items(source, source + count);
   BeginOperation(ModelChange::Insert, object, path);
-  field.insert(field.begin() + at, source, source + count);
+  if (at > static_cast<ssize_t>(field.size())) throw std::out_of_range("position to insert at");
+  field.insert(field.begin() + at, items.begin(), items.end());
 }
 template <typename T, typename E, typename V>
 void genop_CreateIntoVector_VisitPrefs(T* object, Path const& path, E& field, ssize_t at, V const* source,

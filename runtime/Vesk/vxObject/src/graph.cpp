@@ -22,14 +22,14 @@ void GraphState::Begin() {
 void GraphState::Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
 
 void GraphState::Unwind(DGNode const* node) {
-  if (!m_targets.empty()) m_unwound[node] = m_targets.back().m_serial;
+  if (!m_targets.empty()) node->m_unwound = m_targets.back().m_serial;
 }
 inline bool GraphState::IsWaiting(DGNode const* node) const {
-  const auto at = m_unwound.find(node);
-  if (at == m_unwound.end() || m_targets.empty() || at->second == m_targets.back().m_serial) return false;
-  const auto target = std::lower_bound(m_targets.begin(), m_targets.end(), at->second,
-                                       [](Target const& t, std::size_t serial) { return t.m_serial < serial; });
-  return target != m_targets.end() && target->m_serial == at->second;
+  const std::size_t serial = node->m_unwound;
+  if (serial == 0 || m_targets.empty() || serial == m_targets.back().m_serial) return false;
+  const auto target = std::lower_bound(m_targets.begin(), m_targets.end(), serial,
+                                       [](Target const& t, std::size_t other) { return t.m_serial < other; });
+  return target != m_targets.end() && target->m_serial == serial;
 }
 
 inline bool GraphState::IsDeep() const {
@@ -37,38 +37,45 @@ inline bool GraphState::IsDeep() const {
   return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > MostCalculationStack;
 }
 
-GraphState::NotifyScope::NotifyScope(GraphState& state, xvector<DGNode const*>& nodes) : m_state(state) {
-  state.m_notified.push_back(&nodes);
-}
-GraphState::NotifyScope::~NotifyScope() { m_state.m_notified.pop_back(); }
-
 void GraphState::OnDestroy(DGNode const* node) {
-  for (xvector<DGNode const*>* nodes : m_notified) {
-    std::replace(nodes->begin(), nodes->end(), node, static_cast<DGNode const*>(nullptr));
-  }
   if (!m_isEvaluating) return;
   m_again.erase(node);
   m_failed.erase(node);
-  m_unwound.erase(node);
   m_targets.erase(std::remove_if(m_targets.begin(), m_targets.end(), [=](Target const& t) { return t.m_node == node; }),
                   m_targets.end());
-  for (Calculation* at = m_calculation; at; at = at->m_outer) at->m_inputs.erase(node);
+  for (Calculation* at = m_calculation; at; at = at->m_outer) {
+    if (at->m_inputs) at->m_inputs->erase(node);
+  }
   // What a calculation had made and wanted to read: the calculation itself must begin further out.
   if (m_deep == node) m_deep = m_calculation ? m_calculation->m_node : nullptr;
 }
 
+void GraphState::LoseInput() {
+  if (m_calculation && m_calculation->m_node) m_calculation->m_node->CalculateAgain(DGNode::EAgain::Hard);
+}
+
 // --- What others ask and tell
 
-DGNode::FailedRead::~FailedRead() {
-  if (!m_reader || m_reader == m_node || m_state.m_deep) return;
-  m_node->Link(m_state);
-  m_state.m_again.insert({m_reader, false});
-}
+// A reader that goes on without the value has still read it: it must look again when that may be there.
+struct DGNode::FailedRead {
+  ~FailedRead() {
+    if (!m_reader || m_reader == m_node || m_state.m_deep) return;
+    m_reader->CalculateAgain(EAgain::Soft);
+    try {
+      m_node->Link(m_state);
+    } catch (std::bad_alloc const&) {
+    }
+  }
+  GraphState& m_state;
+  DGNode const* m_node;
+  DGNode const* m_reader;
+};
 
 void DGNode::TryEvict(bool force) const {
   if (m_isEmpty || m_isCalculating || !(force || IsEvictable())) return;
   OnEvict();
   Forget();
+  m_inputs = Links();
   m_state = EState::Hard;
   m_isEmpty = m_isNews = true;
   InvalidateDependents();
@@ -82,13 +89,23 @@ xvector<DGNode const*> DGNode::NodesOf(Links const& links) {
 xvector<DGNode const*> DGNode::Inputs() const { return NodesOf(m_inputs); }
 xvector<DGNode const*> DGNode::Dependents() const { return NodesOf(m_dependents); }
 
-void DGNode::TellDependents() const { Change(xvector<DGNode const*>(1, this)); }
-
 // --- Links
+
+// So that adding a link cannot fail.
+inline void DGNode::MakeRoom(Links& links) {
+  if (links.size() == links.capacity()) links.reserve(links.empty() ? 1 : 2 * links.size());
+}
 
 void DGNode::Link(GraphState& state) const {
   DGNode const* reader = state.m_calculation->m_node;
-  if (!state.m_calculation->IsNew(this)) return;
+  try {
+    MakeRoom(reader->m_inputs);
+    MakeRoom(m_dependents);
+    if (!state.m_calculation->IsNew(this)) return;
+  } catch (std::bad_alloc const&) {
+    reader->CalculateAgain(EAgain::Hard);
+    throw;
+  }
   reader->m_inputs.push_back({this, m_dependents.size()});
   m_dependents.push_back({reader, reader->m_inputs.size() - 1});
 }
@@ -103,17 +120,27 @@ void DGNode::Drop(Links& links, Links DGNode::*backwards, std::size_t at) {
 // Leaves the graph behind it.
 void DGNode::Forget() const {
   LeaveQueue();
-  for (NodeLink const& link : std::exchange(m_inputs, {})) {
+  for (NodeLink const& link : m_inputs) {
     DGNode const* input = link.m_node;
     Drop(input->m_dependents, &DGNode::m_inputs, link.m_at);
     if (input->m_dependents.empty()) input->OnNoDependents();
   }
+  m_inputs.clear();
 }
 
-DGNode::Links DGNode::DropDependents() const {
-  Links dependents = std::exchange(m_dependents, {});
-  for (NodeLink const& link : dependents) Drop(link.m_node->m_inputs, &DGNode::m_dependents, link.m_at);
-  return dependents;
+// The links keep their memory for those who will read this node again.
+void DGNode::DropDependents(GraphState* state, Changes& dirty) const {
+  for (NodeLink const& link : m_dependents) {
+    DGNode const* node = link.m_node;
+    Drop(node->m_inputs, &DGNode::m_dependents, link.m_at);
+    if (node->m_isCalculating) {
+      // A calculation that used a node in passing is not told of its end.
+      if (!state) continue;
+      state->m_calculation->Forget(node, this);
+    }
+    node->Mark(true, dirty);
+  }
+  m_dependents.clear();
 }
 
 DGNode::~DGNode() {
@@ -121,63 +148,63 @@ DGNode::~DGNode() {
   if (state) state->OnDestroy(this);
   Forget();
   if (m_dependents.empty()) return;
-  // A calculation that used this node in passing has not been told of a change.
-  xvector<DGNode const*> dirty;
-  for (NodeLink const& link : DropDependents()) {
-    if (!link.m_node->m_isCalculating) link.m_node->Mark(GraphState::Get(), true, dirty);
-  }
+  Changes dirty;
+  DropDependents(nullptr, dirty);
   Spread(GraphState::Get(), dirty);
 }
 
 // --- What is dirty
 
-inline void DGNode::Mark(GraphState& state, bool hard, xvector<DGNode const*>& dirty) const {
-  if (m_isCalculating) {
-    bool& again = state.m_again[this];
-    again = again || hard;
-    return;
-  }
+inline void DGNode::Mark(bool hard, Changes& dirty) const {
+  if (m_isCalculating) return CalculateAgain(hard ? EAgain::Hard : EAgain::Soft);
   const bool wasClean = m_state == EState::Clean;
   if (hard || wasClean) m_state = hard ? EState::Hard : EState::Soft;
-  if (wasClean) dirty.push_back(this);
+  if (wasClean) Join(dirty);
 }
 
-// Goes on from nodes that were clean to all that depends on them, then tells them.
-void DGNode::Spread(GraphState& state, xvector<DGNode const*>& dirty) {
-  for (std::size_t i = 0; i < dirty.size(); ++i) {
-    for (NodeLink const& link : dirty[i]->m_dependents) link.m_node->Mark(state, false, dirty);
+// Goes on from nodes that were clean to all that depends on them, then tells them. Who is told may do anything: what
+// has become clean again leaves the list of one change for that of the next.
+void DGNode::Spread(GraphState& state, Changes& dirty) {
+  if (dirty.IsEmpty()) return;
+  for (NodePlace const* at = dirty.First(); at != dirty.End(); at = at->m_next) {
+    for (NodeLink const& link : Changed(at)->m_dependents) link.m_node->Mark(false, dirty);
   }
-  if (dirty.empty()) return;
-  GraphState::NotifyScope scope(state, dirty);
   Calculation detached(state, nullptr);
-  for (std::size_t i = 0; i < dirty.size(); ++i) {
-    if (dirty[i]) dirty[i]->OnInvalidate();
+  while (!dirty.IsEmpty()) {
+    DGNode const* node = Changed(dirty.First());
+    dirty.First()->Leave();
+    node->OnInvalidate();
   }
 }
 
 void DGNode::Invalidate(bool hard) const {
-  GraphState& state = GraphState::Get();
-  xvector<DGNode const*> dirty;
-  Mark(state, hard, dirty);
-  Spread(state, dirty);
+  Changes dirty;
+  Mark(hard, dirty);
+  Spread(GraphState::Get(), dirty);
 }
 
 void DGNode::InvalidateDependents() const {
   if (m_dependents.empty()) return;
+  Changes dirty;
+  for (NodeLink const& link : m_dependents) link.m_node->Mark(false, dirty);
+  Spread(GraphState::Get(), dirty);
+}
+
+void DGNode::TellDependents() const {
   GraphState& state = GraphState::Get();
-  xvector<DGNode const*> dirty;
-  for (NodeLink const& link : m_dependents) link.m_node->Mark(state, false, dirty);
+  Changes dirty;
+  DropDependents(&state, dirty);
+  OnNoDependents();
   Spread(state, dirty);
 }
 
-void DGNode::Change(xvector<DGNode const*> const& nodes) {
+void DGNode::Change(Changes& nodes) {
   GraphState& state = GraphState::Get();
-  xvector<DGNode const*> dirty;
-  for (DGNode const* node : nodes) {
-    for (NodeLink const& link : node->DropDependents()) {
-      if (state.m_calculation) state.m_calculation->Forget(link.m_node, node);
-      link.m_node->Mark(state, true, dirty);
-    }
+  Changes dirty;
+  while (!nodes.IsEmpty()) {
+    DGNode const* node = Changed(nodes.First());
+    nodes.First()->Leave();
+    node->DropDependents(&state, dirty);
     node->OnNoDependents();
   }
   Spread(state, dirty);
@@ -186,11 +213,18 @@ void DGNode::Change(xvector<DGNode const*> const& nodes) {
 // --- Calculating
 
 void DGNode::BringUpToDate(GraphState& state) const {
+  FailedRead failed{state, this, state.m_calculation ? state.m_calculation->m_node : nullptr};
   if (m_isCalculating) throw GraphError("cyclic dependency: " + Name());
-  if (state.m_isEvaluating) {
+  if (!state.m_isEvaluating) {
+    BeginRead(state);
+  } else {
     if (state.m_deep) throw DeepRead();
-    return Update(state);
+    Update(state);
   }
+  failed.m_reader = nullptr;
+}
+
+void DGNode::BeginRead(GraphState& state) const {
   state.Begin();
   try {
     Evaluate(state);
@@ -223,24 +257,31 @@ void DGNode::Evaluate(GraphState& state) const {
   }
 }
 
+inline void DGNode::Update(GraphState& state) const {
+  if (m_state == EState::Hard) return Calculate(state);
+  LookAtInputs(state);
+}
+
 // Looks at the inputs in the order in which they were read: as long as none has changed, the next one would be read
 // again.
-void DGNode::Update(GraphState& state) const {
-  if (m_state == EState::Hard) return Calculate(state);
-  struct Step {
-    DGNode const* m_node;
-    std::size_t m_input;
-  };
-  xvector<Step> steps(1, Step{this, 0});
-  while (!steps.empty()) {
-    Step& step = steps.back();
+void DGNode::LookAtInputs(GraphState& state) const {
+  struct Steps {
+    explicit Steps(xvector<GraphState::Step>& list) : m_list(list), m_begin(list.size()) {}
+    ~Steps() { m_list.resize(m_begin); }
+    std::size_t Count() const { return m_list.size() - m_begin; }
+    xvector<GraphState::Step>& m_list;
+    std::size_t m_begin;
+  } steps(state.m_steps);
+  steps.m_list.push_back({this, 0});
+  while (steps.Count() > 0) {
+    GraphState::Step& step = steps.m_list.back();
     DGNode const* node = step.m_node;
     if (node->m_state == EState::Soft && step.m_input < node->m_inputs.size()) {
       DGNode const* input = node->m_inputs[step.m_input].m_node;
       if (input->m_state == EState::Clean) {
         ++step.m_input;
       } else {
-        steps.push_back({input, 0});
+        steps.m_list.push_back({input, 0});
       }
       continue;
     }
@@ -249,11 +290,11 @@ void DGNode::Update(GraphState& state) const {
       try {
         node->Calculate(state);
       } catch (...) {
-        if (state.m_deep || steps.size() == 1) throw;
-        steps[steps.size() - 2].m_node->m_state = EState::Hard;  // it may know what to do without this input
+        if (state.m_deep || steps.Count() == 1) throw;
+        steps.m_list[steps.m_list.size() - 2].m_node->m_state = EState::Hard;  // it may know what to do without this
       }
     }
-    steps.pop_back();
+    steps.m_list.pop_back();
   }
 }
 
@@ -283,8 +324,9 @@ void DGNode::Calculate(GraphState& state) const {
   }
 }
 
-void DGNode::Recalculate(GraphState& state) const {
+inline void DGNode::Recalculate(GraphState& state) const {
   Forget();
+  m_again = EAgain::No;
   bool isChanged;
   {
     Calculation calculation(state, this);
@@ -292,11 +334,12 @@ void DGNode::Recalculate(GraphState& state) const {
     isChanged = RecalcCache();
     if (state.m_deep) throw DeepRead();  // its reader thought that it could do without
   }
+  if (m_again != EAgain::No) state.m_again[this] |= m_again == EAgain::Hard;
   m_state = EState::Clean;
   JoinQueue(state);
-  if (!std::exchange(m_isNews, false) && !isChanged) return;
-  xvector<DGNode const*> dirty;
-  for (NodeLink const& link : m_dependents) link.m_node->Mark(state, true, dirty);
+  if ((!std::exchange(m_isNews, false) && !isChanged) || m_dependents.empty()) return;
+  Changes dirty;
+  for (NodeLink const& link : m_dependents) link.m_node->Mark(true, dirty);
   Spread(state, dirty);
 }
 
@@ -311,23 +354,25 @@ Calculation::~Calculation() {
 
 void Calculation::Forget(DGNode const* node, DGNode const* input) {
   for (Calculation* at = this; at; at = at->m_outer) {
-    if (at->m_node == node) at->m_inputs.erase(input);
+    if (at->m_node == node && at->m_inputs) at->m_inputs->erase(input);
   }
 }
 
 inline bool Calculation::IsNew(DGNode const* input) {
   const auto& inputs = m_node->m_inputs;
   const std::size_t few = 16;
-  if (m_inputs.empty() && inputs.size() < few) {
-    for (DGNode::NodeLink const& link : inputs) {
-      if (link.m_node == input) return false;
+  if (!m_inputs) {
+    if (inputs.size() < few) {
+      for (DGNode::NodeLink const& link : inputs) {
+        if (link.m_node == input) return false;
+      }
+      return true;
     }
-    return true;
+    auto all = std::make_unique<std::unordered_set<DGNode const*>>();
+    for (DGNode::NodeLink const& link : inputs) all->insert(link.m_node);
+    m_inputs = std::move(all);
   }
-  if (m_inputs.empty()) {
-    for (DGNode::NodeLink const& link : inputs) m_inputs.insert(link.m_node);
-  }
-  return m_inputs.insert(input).second;
+  return m_inputs->insert(input).second;
 }
 
 bool Calculation::Owns(void const* address) {
@@ -342,15 +387,27 @@ bool Calculation::Owns(void const* address) {
   return at - reinterpret_cast<std::uintptr_t>(m_place.m_begin) < m_place.m_size;
 }
 
+// Clearing a table of hashes takes the time of the most that was ever in it, so a used one is given up.
+template <typename Map>
+inline void Empty(Map& map) {
+  if (!map.empty()) Map().swap(map);
+}
+template <typename T>
+inline void Empty(xvector<T>& list) {
+  list.clear();
+  if (list.capacity() > 1024) list.shrink_to_fit();
+}
+
 void GraphState::End() {
   m_isEvaluating = false;
   m_deep = nullptr;
-  m_failed.clear();
-  m_targets.clear();
-  m_unwound.clear();
+  Empty(m_failed);
+  Empty(m_targets);
+  Empty(m_steps);
   while (!m_again.empty()) {
     const auto [node, hard] = *m_again.begin();
     m_again.erase(m_again.begin());
+    if (m_again.empty()) std::unordered_map<DGNode const*, bool>().swap(m_again);
     node->Invalidate(hard);
   }
 }
@@ -360,15 +417,18 @@ void GraphState::End() {
 inline void DGNode::JoinQueue(GraphState& state) const {
   m_queue = &state.m_queues[EvictionQueueIndex()];
   m_queue->m_byteSize += m_byteSize;
-  m_queuePlace = m_queue->m_nodes.insert(m_queue->m_nodes.end(), this);
+  ++m_queue->m_count;
+  m_queue->m_nodes.Append(*this);
   state.Use();
 }
 inline void DGNode::LeaveQueue() const {
   EvictionQueue* queue = std::exchange(m_queue, nullptr);
   if (!queue) return;
   queue->m_byteSize -= m_byteSize;
-  if (queue->m_next == m_queuePlace) ++queue->m_next;
-  queue->m_nodes.erase(m_queuePlace);
+  --queue->m_count;
+  QueuePlace const& place = *this;
+  if (queue->m_next == &place) queue->m_next = place.m_next;
+  place.Leave();
   queue->m_state->Release();
 }
 void DGNode::UpdateByteSize() const {
@@ -380,8 +440,11 @@ void DGNode::UpdateByteSize() const {
 EvictionQueue& EvictionQueue::Get(ssize_t index) { return GraphState::Get().m_queues[index]; }
 
 void EvictionQueue::EvictDownTo(ssize_t budget) {
-  for (m_next = m_nodes.begin(); m_next != m_nodes.end() && m_byteSize > budget;) (*m_next++)->TryEvict(false);
-  m_next = m_nodes.end();
+  for (m_next = m_nodes.First(); m_next != m_nodes.End() && m_byteSize > budget;) {
+    NodePlace const* place = std::exchange(m_next, m_next->m_next);
+    static_cast<DGNode const*>(static_cast<QueuePlace const*>(place))->TryEvict(false);
+  }
+  m_next = m_nodes.End();
 }
 
 }  // namespace vesk

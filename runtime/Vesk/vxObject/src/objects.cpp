@@ -161,7 +161,9 @@ ssize_t ObjectHeap::Count() const {
 }
 
 ssize_t ObjectHeap::Collect(xvector<ptr<IObject>> const& roots) {
+  // Of one that was given up when a visit threw.
   m_reached.clear();
+  m_pending.clear();
   for (ptr<IObject> const& root : roots) VisitObject(root);
   while (!m_pending.empty()) {
     const ptr<IObject> object = m_pending.back();

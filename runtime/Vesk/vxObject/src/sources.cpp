@@ -9,32 +9,86 @@
 
 namespace vesk {
 
-class DataNode : public DGIndepNode {
+// Sources that nobody reads any more. The last few are kept: what is written is most often read again soon.
+struct IdlePlace : NodePlace {};
+class Source;
+struct IdleSources : PerThread<IdleSources> {
+  enum { Most = 64 };
+  ~IdleSources();
+  void MakeRoom() {
+    if (m_count >= Most) DropOldest();
+  }
+  void Add(Source const& source);
+  void DropOldest();
+
+  NodeList<IdlePlace> m_list;
+  ssize_t m_count = 0;
+};
+
+class Source : public DGIndepNode, private IdlePlace {
+ protected:
+  explicit Source(IdleSources& idle) { idle.Add(*this); }
+  ~Source() override { Leave(); }
+
+  void Read(GraphState& state) const {
+    Link(state);
+    Leave();
+  }
+  void OnNoDependents() const override {
+    if (m_idle) return;
+    if (IdleSources* idle = IdleSources::Peek()) {
+      idle->MakeRoom();
+      idle->Add(*this);
+    } else {
+      delete this;
+    }
+  }
+
+ private:
+  friend struct IdleSources;
+  void Leave() const {
+    if (IdleSources* idle = std::exchange(m_idle, nullptr)) --idle->m_count;
+    IdlePlace::Leave();
+  }
+  mutable IdleSources* m_idle = nullptr;
+};
+
+IdleSources::~IdleSources() {
+  while (m_count > 0) DropOldest();
+}
+void IdleSources::Add(Source const& source) {
+  if (source.m_idle) return;
+  source.m_idle = this;
+  m_list.Append(source);
+  ++m_count;
+}
+void IdleSources::DropOldest() { delete static_cast<Source const*>(static_cast<IdlePlace const*>(m_list.First())); }
+
+class DataNode : public Source {
  public:
   xstring Name() const override { return m_name->first; }
 
   static void OnRead(void const* begin, std::size_t size, void const* object, ConstStringZ name) {
     GraphState& state = GraphState::Get();
     if (state.m_calculation->Owns(begin)) return;
+    IdleSources& idle = IdleSources::Get();
+    idle.MakeRoom();
     Table& table = Table::Get();
     AddressMap& addresses = table.m_bySize[SizeClass(size)];
     octet_t const* address = static_cast<octet_t const*>(begin);
     for (auto [at, end] = addresses.equal_range(address); at != end; ++at) {
-      if (at->second->m_size == size && at->second->m_name->first == name) return at->second->Link(state);
+      if (at->second->m_size == size && at->second->m_name->first == name) return at->second->Read(state);
     }
-    (new DataNode(table, addresses, address, size, object, name))->Link(state);
+    (new DataNode(idle, table, addresses, address, size, object, name))->Read(state);
   }
 
   static void OnWrite(void const* begin, std::size_t size, void const* object, ConstStringZ name) {
     Table* table = Table::Peek();
     if (!table || table->m_bySize.empty()) return;
-    xvector<DGNode const*> found;
+    Changes found;
     table->FindMemory(static_cast<octet_t const*>(begin), size, found);
     if (name) table->FindField(object, name, found);
-    if (found.empty()) return;
-    std::sort(found.begin(), found.end());
-    found.erase(std::unique(found.begin(), found.end()), found.end());
-    Change(found);
+    if (!found.IsEmpty()) Change(found);
   }
 
  private:
@@ -55,25 +109,25 @@ class DataNode : public DGIndepNode {
 
   struct Table : PerThread<Table> {
     // Fields of about one size are each within another or apart, so that only those near an address can hold it.
-    void FindMemory(octet_t const* address, std::size_t size, xvector<DGNode const*>& found) const {
+    void FindMemory(octet_t const* address, std::size_t size, Changes& found) const {
       for (auto const& [sizeClass, addresses] : m_bySize) {
         const std::uintptr_t most = std::uintptr_t(1) << sizeClass;
         const std::uintptr_t number = reinterpret_cast<std::uintptr_t>(address);
         const std::uintptr_t from = number > most ? number - most : 0;
         auto at = addresses.lower_bound(reinterpret_cast<octet_t const*>(from));
         for (; at != addresses.end() && at->first < address + size; ++at) {
-          if (at->first + at->second->m_size > address) found.push_back(at->second);
+          if (at->first + at->second->m_size > address) at->second->Join(found);
         }
       }
     }
 
     // A container, or a model around it, finds the elements; an element finds what is around it, and other depths.
-    void FindField(void const* object, std::string_view name, xvector<DGNode const*>& found) const {
+    void FindField(void const* object, std::string_view name, Changes& found) const {
       const std::string_view field = name.substr(0, name.find('['));
       const auto at = m_byField.find(FieldView(object, field));
       if (at != m_byField.end()) {
         for (auto const& [other, sources] : at->second) {
-          if (other != name) found.insert(found.end(), sources.begin(), sources.end());
+          if (other != name) JoinAll(sources, found);
         }
       }
       if (field.size() == name.size()) return FindElementsInside(object, field, found);
@@ -83,7 +137,7 @@ class DataNode : public DGIndepNode {
       const std::size_t model = field.find("::_model_");
       if (model != field.npos) FindWhole(object, field.substr(0, model), found);
     }
-    void FindElementsInside(void const* object, std::string_view field, xvector<DGNode const*>& found) const {
+    void FindElementsInside(void const* object, std::string_view field, Changes& found) const {
       auto at = m_byField.upper_bound(FieldView(object, field));
       for (; at != m_byField.end() && at->first.first == object; ++at) {
         std::string_view name = at->first.second;
@@ -91,30 +145,39 @@ class DataNode : public DGIndepNode {
         name.remove_prefix(field.size());
         if (name[0] != '.' && name[0] != ':') continue;
         for (auto const& [other, sources] : at->second) {
-          if (other.find('[') != other.npos) found.insert(found.end(), sources.begin(), sources.end());
+          if (other.find('[') != other.npos) JoinAll(sources, found);
         }
       }
     }
-    void FindWhole(void const* object, std::string_view name, xvector<DGNode const*>& found) const {
+    void FindWhole(void const* object, std::string_view name, Changes& found) const {
       const auto at = m_byField.find(FieldView(object, name));
       if (at == m_byField.end()) return;
-      for (auto const& [other, sources] : at->second) found.insert(found.end(), sources.begin(), sources.end());
+      for (auto const& [other, sources] : at->second) JoinAll(sources, found);
+    }
+
+    static void JoinAll(std::list<DataNode*> const& sources, Changes& found) {
+      for (DataNode const* source : sources) source->Join(found);
     }
 
     std::map<int, AddressMap> m_bySize;
     FieldMap m_byField;
   };
 
-  DataNode(Table& table, AddressMap& addresses, octet_t const* address, std::size_t size, void const* object,
-           std::string_view name)
-      : m_table(table), m_size(size) {
+  DataNode(IdleSources& idle, Table& table, AddressMap& addresses, octet_t const* address, std::size_t size,
+           void const* object, std::string_view name)
+      : Source(idle), m_table(table), m_size(size) {
     const std::string_view field = name.substr(0, name.find('['));
     m_field =
         table.m_byField.emplace(std::piecewise_construct, std::forward_as_tuple(object, field), std::forward_as_tuple())
             .first;
     m_name = m_field->second.emplace(name, std::list<DataNode*>()).first;
     m_place = m_name->second.insert(m_name->second.end(), this);
-    m_address = addresses.insert({address, this});
+    try {
+      m_address = addresses.insert({address, this});
+    } catch (...) {
+      m_name->second.erase(m_place);
+      throw;
+    }
     table.Use();
   }
   ~DataNode() override {
@@ -126,7 +189,6 @@ class DataNode : public DGIndepNode {
     if (m_field->second.empty()) m_table.m_byField.erase(m_field);
     m_table.Release();
   }
-  void OnNoDependents() const override { delete this; }
 
   static int SizeClass(std::size_t size) {
     int bits = 0;
@@ -142,18 +204,20 @@ class DataNode : public DGIndepNode {
   AddressMap::iterator m_address;
 };
 
-class PathNode : public DGIndepNode {
+class PathNode : public Source {
  public:
   xstring Name() const override { return "model field"; }
 
   static void OnRead(void const* object, Path const& path) {
     GraphState& state = GraphState::Get();
     if (state.m_calculation->Owns(object)) return;
+    IdleSources& idle = IdleSources::Get();
+    idle.MakeRoom();
     Table& table = Table::Get();
     PathMap& paths = table.m_byObject[object];
-    const auto [at, isNew] = paths.emplace(Bytes(path), nullptr);
-    if (isNew) at->second = new PathNode(table, object, at);
-    at->second->Link(state);
+    const auto at = paths.find(Bytes(path));
+    PathNode const* node = at != paths.end() ? at->second : new PathNode(idle, table, object, paths, Bytes(path));
+    node->Read(state);
   }
 
   static void OnWrite(void const* object, Path const& path) {
@@ -161,10 +225,10 @@ class PathNode : public DGIndepNode {
     if (!table) return;
     const auto object_ = table->m_byObject.find(object);
     if (object_ == table->m_byObject.end()) return;
-    xvector<DGNode const*> found;
+    Changes found;
     FindInside(object_->second, Bytes(path), found);
     FindAround(object_->second, Bytes(path), found);
-    if (!found.empty()) Change(found);
+    if (!found.IsEmpty()) Change(found);
   }
 
  private:
@@ -173,39 +237,38 @@ class PathNode : public DGIndepNode {
     std::unordered_map<void const*, PathMap> m_byObject;
   };
 
-  PathNode(Table& table, void const* object, PathMap::iterator place)
-      : m_table(table), m_object(object), m_place(place) {
+  PathNode(IdleSources& idle, Table& table, void const* object, PathMap& paths, std::string_view path)
+      : Source(idle), m_table(table), m_object(object), m_paths(paths) {
+    m_place = paths.emplace(path, this).first;
     table.Use();
   }
   ~PathNode() override {
-    const auto paths = m_table.m_byObject.find(m_object);
-    paths->second.erase(m_place);
-    if (paths->second.empty()) m_table.m_byObject.erase(paths);
+    m_paths.erase(m_place);
+    if (m_paths.empty()) m_table.m_byObject.erase(m_object);
     m_table.Release();
   }
-  void OnNoDependents() const override { delete this; }
 
   static std::string_view Bytes(Path const& path) {
     return std::string_view(reinterpret_cast<char const*>(path.Data()), static_cast<std::size_t>(path.Size()));
   }
 
   // The path itself and those that begin with it stand side by side.
-  static void FindInside(PathMap const& paths, std::string_view path, xvector<DGNode const*>& found) {
+  static void FindInside(PathMap const& paths, std::string_view path, Changes& found) {
     for (auto at = paths.lower_bound(path); at != paths.end(); ++at) {
       if (std::string_view(at->first).substr(0, path.size()) != path) return;
-      found.push_back(at->second);
+      at->second->Join(found);
     }
   }
 
   // The beginnings of a path: of those in front of it the nearest, then of what both have in common, and so on.
-  static void FindAround(PathMap const& paths, std::string_view path, xvector<DGNode const*>& found) {
+  static void FindAround(PathMap const& paths, std::string_view path, Changes& found) {
     for (auto at = paths.lower_bound(path); at != paths.begin();) {
       std::string_view nearest = (--at)->first;
       const std::size_t most = std::min(nearest.size(), path.size());
       std::size_t same = 0;
       while (same < most && nearest[same] == path[same]) ++same;
       if (same == nearest.size()) {
-        found.push_back(at->second);
+        at->second->Join(found);
       } else {
         at = paths.upper_bound(path = path.substr(0, same));
       }
@@ -214,17 +277,28 @@ class PathNode : public DGIndepNode {
 
   Table& m_table;
   void const* m_object;
+  PathMap& m_paths;
   PathMap::iterator m_place;
 };
 
+template <typename Node, typename... Args>
+void ReadSource(Args const&... args) {
+  try {
+    Node::OnRead(args...);
+  } catch (...) {
+    GraphState::Get().LoseInput();
+    throw;
+  }
+}
+
 void DataSource::Read(void const* begin, std::size_t size, void const* object, ConstStringZ name) {
-  DataNode::OnRead(begin, size, object, name);
+  ReadSource<DataNode>(begin, size, object, name);
 }
 void DataSource::OnWrite(void const* begin, std::size_t size, void const* object, ConstStringZ name) {
   DataNode::OnWrite(begin, size, object, name);
 }
 
-void PathSource::Read(void const* object, Path const& path) { PathNode::OnRead(object, path); }
+void PathSource::Read(void const* object, Path const& path) { ReadSource<PathNode>(object, path); }
 void PathSource::OnWrite(void const* object, Path const& path) { PathNode::OnWrite(object, path); }
 
 }  // namespace vesk

@@ -12,6 +12,7 @@ public:
     $visit { v << others; }
 };
 $struct+ Listed isa vesk::IObject : model { xvector<string8> words; int32 count; } { };
+$struct+ Barred <<-genop>> isa vesk::IObject : model { xvector<string8> words; } { };
 
 namespace
 {
@@ -29,6 +30,12 @@ void Heap(Faults& faults)
         heap.Collect({vesk::ptr<vesk::IObject>(root)});
     });
     faults.Expect(Kept::s_count >= 3, "what is reached is kept");
+    // A collection that was given up remembers none of them.
+    while (!root->others.empty())
+    {
+        root->others.back()->DestroyObject();
+        root->others.pop_back();
+    }
     heap.Collect({});
     faults.Expect(Kept::s_count == 0 && heap.Count() == 0, "all objects are collected");
 }
@@ -65,6 +72,27 @@ void ModelVectors(Faults& faults)
     faults.Expect(changes == seen && !vesk::ModelHook::Any(), "hooks end");
 }
 
+// A hook that erases what stands ahead of the position of a write.
+template <typename Object>
+void ErasingHook(Faults& faults)
+{
+    Object object;
+    for (int i = 0; i < 4; ++i) object.words.push_back(vesk::string8(40, 'a'));
+    bool isRefused = false;
+    const bool isDone = faults.Try([&] {
+        vesk::ModelHook hook([&](vesk::ModelChange const&) { object.words.model().clear(); });
+        try
+        {
+            object.words.push_back(object.words.read()[3]);
+        }
+        catch (std::out_of_range const&)
+        {
+            isRefused = true;
+        }
+    });
+    faults.Expect(isRefused || !isDone, "a write whose position is gone is refused");
+}
+
 void Hooks(Faults& faults)
 {
     Listed listed;
@@ -86,5 +114,5 @@ void Hooks(Faults& faults)
 
 vesk::xvector<Scenario> ContainerScenarios()
 {
-    return {{"heap", Heap}, {"dynamic arrays", DynamicArrays}, {"model vectors", ModelVectors}, {"hooks", Hooks}};
+    return {{"heap", Heap}, {"dynamic arrays", DynamicArrays}, {"model vectors", ModelVectors}, {"hooks", Hooks}, {"erasing hook", ErasingHook<Listed>}, {"erasing hook, no operations", ErasingHook<Barred>}};
 }

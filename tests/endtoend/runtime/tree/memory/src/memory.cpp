@@ -49,7 +49,7 @@ int main()
     Register_Project_memory();
     int scenarios = 0;
     int runs = 0;
-    for (auto list : {ContainerScenarios, ValueScenarios})
+    for (auto list : {GraphScenarios, ContainerScenarios, ValueScenarios})
     {
         for (Scenario const& scenario : list())
         {

@@ -52,5 +52,6 @@ struct Scenario
     void (*run)(Faults&);
 };
 
+vesk::xvector<Scenario> GraphScenarios();
 vesk::xvector<Scenario> ContainerScenarios();
 vesk::xvector<Scenario> ValueScenarios();
