@@ -182,6 +182,7 @@ bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
   BringUpToDate(file);
   const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
   objectTime = times.LastWriteTime(object);
+  settings.made.insert(object);
   return compiled;
 }
 
@@ -202,11 +203,14 @@ bool ProjectBuilder::LinkIfStale() {
     const auto known = m_objectTimes.find(input);
     return known == m_objectTimes.end() ? LastWriteTime(input) : known->second;
   };
-  const bool isCurrent = targetTime != 0 && std::none_of(inputs.begin(), inputs.end(), [&](const std::string& input) {
-                           return timeOf(input) > targetTime;
-                         });
+  auto isLater = [&](const std::string& input) {
+    const int64_t time = timeOf(input);
+    return time > targetTime || (time == targetTime && settings.made.contains(input));
+  };
+  const bool isCurrent = targetTime != 0 && std::none_of(inputs.begin(), inputs.end(), isLater);
   if (isCurrent) return true;
   if (!LinkTarget(*this, target, inputs)) return false;
+  settings.made.insert(target);
   if (!CompilerOf(settings.compiler).embedsManifest) return true;
   if (EmbedManifest(*this)) return true;
   DeleteThoughReadOnly(target);  // a target without its manifest must not pass for a good one
@@ -227,8 +231,11 @@ void ProjectBuilder::Save(const std::string& dependencyFile) {
 void ProjectBuilder::Clean(const std::string& dependencyFile) {
   WriteHeading("\n");
   project.CollectFiles();
-  DeleteReporting(dependencyFile);
-  for (const ProjectFile* file : project.files) DeleteReporting(TranslatedPath(*file));
+  auto remove = [this](const std::string& path) {
+    if (!DeleteReporting(path)) ++errorCount;
+  };
+  remove(dependencyFile);
+  for (const ProjectFile* file : project.files) remove(TranslatedPath(*file));
 }
 
 namespace {

@@ -107,6 +107,7 @@ bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::str
   const bool isGcc = IsGccFamily(builder.settings.compiler);
   std::string output;
   int returnCode = 0;
+  RemoveLink(ObjectPath(builder, file));
   const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
   if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) return true;
   if (builder.errorCount == errorsBefore) {
@@ -143,6 +144,7 @@ bool CompileResource(ProjectBuilder& builder, ScannedFile& scanned) {
   WriteResourceSwitches(command, builder.config);
   command << " /fo\"" << ResourceObjectPath(builder, scanned.file) << "\" \"" << scanned.SourcePath() << "\"";
   TraceWriter() << "Compiling resource file " << scanned.file.path << "\n";
+  RemoveLink(ResourceObjectPath(builder, scanned.file));
   CommandOptions options;
   options.echo = builder.settings.diagnostics;
   options.failOnNonZero = true;

@@ -3,6 +3,7 @@
 
 #include <map>
 #include <string>
+#include <unordered_set>
 #include <vector>
 
 #include "macro/mpfw_parser.h"
@@ -48,6 +49,8 @@ struct ConfigSettings {
   RunMode mode = RunMode::Build;
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   mutable LeftoverSweep leftovers;  // whoever may read the settings may write files
+  // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
+  std::unordered_set<std::string> made;
 
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };
