@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <unordered_map>
 
+#include "text/files.h"
 #include "text/paths.h"
 #include "workspace/switch_blocks.h"
 #include "workspace/workspace.h"
@@ -78,7 +79,12 @@ std::string Project::ListingHint(const ProjectFile& file) const {
   std::string path;
   int64_t line;
   if (!FindExpandedLine(settings->sourceFiles, file.listedAt, path, line)) return {};
-  return file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+  std::string hint = file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+  for (const std::string& root : settings->virtualTree) {
+    if (root == rootDir || !FileExists(PathJoin(root, file.path))) continue;
+    return hint + "; it is in " + root + ", but files of a project are read below its own root, " + rootDir;
+  }
+  return hint;
 }
 
 namespace {
