@@ -23,6 +23,7 @@ import tempfile
 import time
 from pathlib import Path
 
+import layout
 import stamps
 
 HERE = Path(__file__).resolve().parent
@@ -288,6 +289,7 @@ def all_rows(binary, library, folder, short, mounts):
     kinds = {name: RUNS[name][0] for name in ("translate", "build")}
     runs = stamps.Runs(binary, stamps.build_library(folder), run, outputs)
     yield from stamps.rows(runs, folder / "build", folder, kinds, short)
+    yield from layout.rows(binary, library, folder, FAULTS, lambda count: some(count, 3 if short else 10**6))
 
 
 def build_library(folder):
