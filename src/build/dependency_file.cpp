@@ -72,6 +72,28 @@ ScannedFile* FindScanned(ProjectBuilder& builder, std::string_view path) {
   return nullptr;
 }
 
+bool IsImported(const ProjectBuilder& builder, const ProjectFile& file) {
+  return std::any_of(builder.scannedByPath.begin(), builder.scannedByPath.end(), [&](const auto& entry) {
+    const auto& imports = entry.second->imports;
+    return std::any_of(imports.begin(), imports.end(), [&](const auto* import) { return &import->file == &file; });
+  });
+}
+
+// Whether what was read is of this project, as far as its paths tell: else the main source would register for good what
+// another project declares.
+bool FitsProject(const ProjectBuilder& builder) {
+  const auto isOwn = [&](const ProjectFile& file) { return file.project == &builder.project; };
+  const auto fits = [&](const DeclarationRegistry& registry) {
+    return std::all_of(registry.entries.begin(), registry.entries.end(), [&](const auto& entry) {
+      const ProjectFile* file = builder.FindFile(entry.first);
+      return file && (isOwn(*file) || IsImported(builder, *file));
+    });
+  };
+  const bool hasOwn = std::any_of(builder.scannedByPath.begin(), builder.scannedByPath.end(),
+                                  [&](const auto& entry) { return isOwn(entry.second->file); });
+  return (hasOwn || builder.scannedByPath.empty()) && fits(builder.registerMap) && fits(builder.unregisterMap);
+}
+
 }  // namespace
 
 std::string DependencyPayload(const ProjectBuilder& builder) {
@@ -108,7 +130,7 @@ bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload) {
   }
   reader.Registry(builder.registerMap);
   reader.Registry(builder.unregisterMap);
-  return true;
+  return FitsProject(builder);
 }
 
 bool LoadDependencyFile(ProjectBuilder& builder, const std::string& path) {

@@ -228,6 +228,7 @@ bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::v
   bool linked = false;
   CreateDirectories(target, false);
   try {
+    RemoveLink(target);
     const CommandFile response(builder.settings.leftovers, responseFile, text);
     TraceWriter() << "Linking...\n";
     if (builder.settings.diagnostics) TraceWriter() << responseFile << " = " << text << "\n";

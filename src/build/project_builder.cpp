@@ -203,6 +203,7 @@ bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
   BringUpToDate(file);
   const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
   objectTime = times.LastWriteTime(object);
+  settings.made.insert(object);
   return compiled;
 }
 
@@ -239,10 +240,15 @@ bool ProjectBuilder::LinkIfStale() {
   };
   std::vector<std::string> watched = LibrariesOfSwitches(*this);
   watched.insert(watched.end(), inputs.begin(), inputs.end());
-  const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), [&](const std::string& input) {
-                           return timeOf(input) > targetTime;
-                         });
-  return (isCurrent && !LiesAhead(*this, targetTime)) || MakeTarget(*this, target, inputs);
+  auto isLater = [&](const std::string& input) {
+    const int64_t time = timeOf(input);
+    return time > targetTime || (time == targetTime && settings.made.contains(input));
+  };
+  const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), isLater);
+  if (isCurrent && !LiesAhead(*this, targetTime)) return true;
+  if (!MakeTarget(*this, target, inputs)) return false;
+  settings.made.insert(target);
+  return true;
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
@@ -259,8 +265,11 @@ void ProjectBuilder::Save(const std::string& dependencyFile) {
 void ProjectBuilder::Clean(const std::string& dependencyFile) {
   WriteHeading("\n");
   project.CollectFiles();
-  DeleteReporting(dependencyFile);
-  for (const ProjectFile* file : project.files) DeleteReporting(TranslatedPath(*file));
+  auto remove = [this](const std::string& path) {
+    if (!DeleteReporting(path)) ++errorCount;
+  };
+  remove(dependencyFile);
+  for (const ProjectFile* file : project.files) remove(TranslatedPath(*file));
 }
 
 namespace {

@@ -23,7 +23,7 @@ class ProjectBuilder : public TranslationHost {
   // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
   // An exception of the translation goes on to the caller; what was finished before it is kept.
   bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
-  void Clean(const std::string& dependencyFile);
+  void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   // --- TranslationHost
   const ConfigSettings& Settings() const override { return settings; }

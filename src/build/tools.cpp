@@ -111,6 +111,7 @@ bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::str
   const bool isGcc = IsGccFamily(builder.settings.compiler);
   std::string output;
   int returnCode = 0;
+  RemoveLink(ObjectPath(builder, file));
   try {
     ToolOutputs object(builder.settings, {ObjectPath(builder, file)}, {responseFile});
     const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
@@ -174,6 +175,7 @@ bool CompileResource(ProjectBuilder& builder, ScannedFile& scanned) {
   command << " /fo\"" << ResourceObjectPath(builder, scanned.file) << "\" \"" << scanned.SourcePath() << "\"";
   TraceWriter() << "Compiling resource file " << scanned.file.path << "\n";
   if (!ToolsTake(builder, {scanned.SourcePath(), ResourceObjectPath(builder, scanned.file)})) return false;
+  RemoveLink(ResourceObjectPath(builder, scanned.file));
   CommandOptions options;
   options.echo = builder.settings.diagnostics;
   options.failOnNonZero = true;

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <vector>
 
+#include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -21,6 +22,7 @@ constexpr char kRuntimeInTexts[] = "{{RUNTIME}}";
 constexpr char kHiddenName[] = "dot.";  // begins the name of a file that is to begin with a dot
 constexpr char kTemplates[] = "templates/workspace";
 constexpr char kRuntime[] = "runtime";
+constexpr char kBesideEnd[] = ".qrex-init.part";  // of the folder in which a workspace is laid out
 
 bool Complain(const std::string& message) {
   WriteToConsole("Error: " + message + "\n");
@@ -46,7 +48,8 @@ bool FindData(std::string& data) {
     platform::FileInfo templates, runtime;
     if (platform::Stat(candidate + "/" + kTemplates, templates) &&
         platform::Stat(candidate + "/" + kRuntime, runtime)) {
-      return RealPathOf(candidate, data);
+      if (!RealPathOf(candidate, data)) throw FileException(candidate);
+      return true;
     }
     tried += "\n    " + candidate;
   }
@@ -69,9 +72,11 @@ class Layout {
  private:
   void Add(const std::string& from, const std::string& to) {
     FileOrDirIterator entries(from + "/*");
+    if (entries.FailureCode() != 0) throw FileException(entries.FailureCode(), from);
     while (const IFileOrDirInfo* entry = entries.Next()) {
       const std::string source = entry->Name();
       if (source == "." || source == "..") continue;
+      if (entries.EntryFailure() != 0) throw FileException(entries.EntryFailure(), from + "/" + source);
       const std::string target = to + "/" + TargetName(source);
       if (entry->IsDirectory()) {
         Add(from + "/" + source, target);
@@ -96,25 +101,76 @@ class Layout {
   std::vector<LaidOutFile> m_files;
 };
 
-}  // namespace
+enum class Place { Free, Ours, Taken };
 
-bool InitWorkspace(const std::string& name, const std::string& folder) {
+// What stands where the file is to go. One with its very text is of an earlier call, which did not come to its end.
+Place PlaceOf(const LaidOutFile& file) {
+  std::string there;
+  if (ReadWholeFile(there, file.path)) return there == file.text ? Place::Ours : Place::Taken;
+  const uint32_t code = platform::LastError();
+  if (platform::IsNotFound(code)) return Place::Free;
+  platform::FileInfo info;
+  if (!platform::Stat(file.path, info)) throw FileException(code, file.path);
+  return Place::Taken;
+}
+
+void Write(LeftoverSweep& leftovers, const std::string& path, const std::string& text) {
+  CreateDirectories(path, false);
+  leftovers.Beside(path);
+  ReplaceFile(path, text);
+}
+
+// The folder comes to be as a whole.
+void LayOutBeside(const std::vector<LaidOutFile>& files, const std::string& folder) {
+  const std::string beside = folder + kBesideEnd;
+  if (!platform::RemoveTree(beside)) throw FileException(beside);  // of a call that was killed
+  try {
+    LeftoverSweep leftovers;
+    for (const LaidOutFile& file : files) Write(leftovers, beside + file.path.substr(folder.size()), file.text);
+    if (!platform::RenameFile(beside, folder)) throw FileException(folder);
+  } catch (...) {
+    platform::RemoveTree(beside);
+    throw;
+  }
+}
+
+bool IsMissing(const std::string& folder) {
+  platform::FileInfo info;
+  return !platform::Stat(folder, info) && platform::LastError() == platform::kErrorFileNotFound;
+}
+
+bool LayOut(const std::string& name, const std::string& folder) {
   if (!IsIdentifier(name)) return Complain(name + " can't name a workspace: letters, digits and _, a letter first");
   std::string data;
   if (!FindData(data)) return false;
   const Layout layout(name, folder, data);
+  std::vector<LaidOutFile> missing;
   for (const LaidOutFile& file : layout.Files()) {
-    platform::FileInfo there;
-    if (platform::Stat(file.path, there)) return Complain(file.path + " is there already; nothing was written");
+    const Place place = PlaceOf(file);
+    if (place == Place::Taken) return Complain(file.path + " is there already; nothing was written");
+    if (place == Place::Free) missing.push_back(file);
   }
-  for (const LaidOutFile& file : layout.Files()) {
-    CreateDirectories(file.path, false);
-    ReplaceFile(file.path, file.text);
-    WriteToConsole(file.path + "\n");
+  if (missing.empty()) return Complain("All of " + folder + " is there already; nothing was written");
+  if (IsMissing(folder)) {
+    LayOutBeside(missing, folder);
+  } else {
+    LeftoverSweep leftovers;
+    for (const LaidOutFile& file : missing) Write(leftovers, file.path, file.text);
   }
+  for (const LaidOutFile& file : missing) WriteToConsole(file.path + "\n");
   WriteToConsole("\nTo build and run it:\n    cd " + folder + "\n    Qrex " + name + ".qrex\n    out/lib/x64/Debug/" +
                  name + "_app\n");
   return true;
+}
+
+}  // namespace
+
+bool InitWorkspace(const std::string& name, const std::string& folder) {
+  try {
+    return LayOut(name, folder);
+  } catch (const FileException& exception) {
+    return Complain(ExceptionText(exception));
+  }
 }
 
 }  // namespace qrex

@@ -5,8 +5,9 @@
 
 namespace qrex {
 
-// Writes the workspace into the folder, and what was done to standard output; false, with a message and nothing
-// written, when the name will not do, a file is there already, or the templates are not found. Raises FileException.
+// Writes the workspace into the folder, as a whole where that is new, and what was done to standard output; false, with
+// a message, when the name will not do, another file is in the way, or a file could not be read or written. What an
+// earlier call has left unfinished is finished.
 bool InitWorkspace(const std::string& name, const std::string& folder);
 
 }  // namespace qrex

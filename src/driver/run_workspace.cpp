@@ -170,7 +170,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   if (m_warnings > 0 || m_errors > 0) {
     timer.Label() << " with " << m_warnings << " warnings, " << m_errors << " errors";
   }
-  return true;
+  return m_settings.mode != RunMode::Clean || m_errors == 0;
 }
 
 // After an error that ends the run.
@@ -312,6 +312,7 @@ bool WorkspaceRun::BuildProject(Project& project) {
     bool succeeded = true;
     if (m_settings.mode == RunMode::Clean) {
       builder.Clean(dependencyFile);
+      succeeded = builder.errorCount == 0;
     } else {
       succeeded = builder.Build(dependencyFile, nullptr);
       TellCopiedSources(project);

@@ -22,7 +22,13 @@ constexpr int64_t kUnixEpoch = 116444736000000000;  // 1970 on the scale of file
 constexpr size_t kLargePage = 2u << 20;
 constexpr mode_t kWriteBits = S_IWUSR | S_IWGRP | S_IWOTH;
 
-int64_t FileTime(const timespec& time) { return kUnixEpoch + time.tv_sec * 10000000 + time.tv_nsec / 100; }
+constexpr int64_t kUnitsOfSecond = 10'000'000;
+
+int64_t FileTime(const timespec& time) { return kUnixEpoch + time.tv_sec * kUnitsOfSecond + time.tv_nsec / 100; }
+
+bool IsLink(const struct stat& status) {
+  return S_ISLNK(status.st_mode) || (S_ISREG(status.st_mode) && status.st_nlink > 1);
+}
 
 // A descriptor that closes itself.
 class Descriptor {
@@ -112,6 +118,12 @@ bool IsReadOnlyFile(const std::string& path) {
   return Stat(path, info) && !info.isDirectory && info.isReadOnly;
 }
 
+bool IsLink(const std::string& path) {
+  SetLastError(0);
+  struct stat status;
+  return lstat(path.c_str(), &status) == 0 && IsLink(status);
+}
+
 bool ReadFile(const std::string& path, std::string& content, Readable kind) {
   SetLastError(0);
   const bool plainOnly = kind == Readable::PlainFile;
@@ -163,8 +175,16 @@ bool MakeEmptyFile(const std::string& path, bool keepExisting) {
 }
 
 bool RemoveFile(const std::string& path) {
-  if (RefuseReadOnly(path)) return false;
+  if (!IsLink(path) && RefuseReadOnly(path)) return false;
   return unlink(path.c_str()) == 0;
+}
+
+bool RemoveTree(const std::string& path) {
+  boost::system::error_code error;
+  SetLastError(0);
+  boost::filesystem::remove_all(path, error);
+  errno = error.value();
+  return !error;
 }
 
 bool RenameFile(const std::string& from, const std::string& to) {
@@ -180,7 +200,8 @@ bool MakeDirectory(const std::string& path) {
 bool SetReadOnlyAttribute(const std::string& path, bool readOnly) {
   SetLastError(0);
   struct stat status;
-  if (stat(path.c_str(), &status) != 0) return false;
+  if (lstat(path.c_str(), &status) != 0) return false;
+  if (IsLink(status)) return true;
   if (((status.st_mode & kWriteBits) == 0) == readOnly) return true;
   return chmod(path.c_str(), readOnly ? status.st_mode & ~kWriteBits : status.st_mode | S_IWUSR) == 0;
 }
@@ -199,6 +220,14 @@ bool StampNow(const std::string& path) {
   return utimensat(AT_FDCWD, path.c_str(), nullptr, 0) == 0;
 }
 
+bool SetWriteTime(const std::string& path, int64_t time) {
+  SetLastError(0);
+  const int64_t sinceEpoch = time - kUnixEpoch;
+  const timespec stamp{sinceEpoch / kUnitsOfSecond, sinceEpoch % kUnitsOfSecond * 100};
+  const timespec times[2] = {stamp, stamp};
+  return utimensat(AT_FDCWD, path.c_str(), times, 0) == 0;
+}
+
 bool FullPath(const std::string& path, std::string& out) {
   boost::system::error_code error;
   const boost::filesystem::path full = boost::filesystem::absolute(path, error);
@@ -211,7 +240,9 @@ bool FullPath(const std::string& path, std::string& out) {
 
 bool RealPath(const std::string& path, std::string& out) {
   boost::system::error_code error;
+  SetLastError(0);
   out = boost::filesystem::canonical(path, error).generic_string();
+  errno = error.value();
   return !error;
 }
 

@@ -47,6 +47,8 @@ class DirectoryTimes {
 
 bool CanRead(const std::string& path);  // a plain file that opens for reading
 bool IsReadOnlyFile(const std::string& path);
+// A symbolic link, or a name of a file that has others: what is done to the file is done elsewhere too.
+bool IsLink(const std::string& path);
 // A pipe or device is read to its end, which may be waited for without end, only where the caller asks for it.
 enum class Readable { PlainFile, AnyFile };
 bool ReadFile(const std::string& path, std::string& content, Readable kind = Readable::PlainFile);
@@ -55,11 +57,13 @@ void PreferLargePages(void* memory, size_t size);
 void ReserveText(std::string& text, size_t size);                   // as reserve, in large pages where it is large
 bool WriteFile(const std::string& path, std::string_view content);  // in place of what stands there, read-only or not
 bool MakeEmptyFile(const std::string& path, bool keepExisting);
-bool RemoveFile(const std::string& path);
+bool RemoveFile(const std::string& path);  // of a link, the name alone
+bool RemoveTree(const std::string& path);  // true also where there is none
 bool RenameFile(const std::string& from, const std::string& to);
 bool MakeDirectory(const std::string& path);
-bool SetReadOnlyAttribute(const std::string& path, bool readOnly);
+bool SetReadOnlyAttribute(const std::string& path, bool readOnly);  // a link is left alone
 bool StampNow(const std::string& path);
+bool SetWriteTime(const std::string& path, int64_t time);
 bool CopyExecuteBits(const std::string& from, const std::string& to);
 bool FullPath(const std::string& path, std::string& out);
 bool RealPath(const std::string& path, std::string& out);                        // with symbolic links resolved

@@ -45,21 +45,50 @@ bool FileExists(const std::string& path) { return platform::CanRead(Checked(path
 
 bool DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }
 
-bool CopyFile(const std::string& from, const std::string& to, bool failIfExists) {
+namespace {
+
+// A file of this process's own.
+void RemoveBeside(const std::string& beside) {
+  platform::SetReadOnlyAttribute(beside, false);
+  platform::RemoveFile(beside);
+}
+
+// `finish` gets the file beside as it will be renamed.
+template <typename Finish>
+void WriteBesideAndRename(const std::string& path, std::string_view content, Finish finish) {
+  const BesideFile claim(path);
+  const std::string& beside = claim.Path();
+  if (platform::WriteFile(beside, content) && finish(beside) && platform::RenameFile(beside, path)) return;
+  const uint32_t code = platform::LastError();
+  RemoveBeside(beside);
+  throw FileException(code, path);
+}
+
+}  // namespace
+
+bool CopyFile(const std::string& from, const std::string& to, bool failIfExists, bool readOnly) {
   std::string content;
   platform::FileInfo info;
   if (failIfExists && platform::Stat(Checked(to), info)) {
     platform::SetLastError(80);
     return false;
   }
+  const int64_t readTime = CurrentStamp();
   if (!platform::ReadFile(Checked(from), content)) return false;
+  auto finish = [&](const std::string& beside) {
+    if (!platform::CopyExecuteBits(from, beside)) return false;
+    // A file system whose clock is behind shows in what was written. One that takes no times keeps its own.
+    if (platform::Stat(beside, info)) platform::SetWriteTime(beside, std::min(readTime, info.writeTime));
+    if (readOnly) platform::SetReadOnlyAttribute(beside, true);
+    return true;
+  };
   try {
-    ReplaceFile(to, content, ReadOnlyTarget::Replace);
+    WriteBesideAndRename(Checked(to), content, finish);
   } catch (const FileException& exception) {
     platform::SetLastError(exception.errorCode);
     return false;
   }
-  return platform::CopyExecuteBits(from, to);
+  return true;
 }
 
 bool CreateEmptyFile(const std::string& path, bool keepExisting) {
@@ -199,18 +228,10 @@ void LeftoverSweep::Beside(const std::string& path) {
 
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly) {
   Checked(path);
-  if (readOnly == ReadOnlyTarget::Refuse && platform::IsReadOnlyFile(path)) {
+  if (readOnly == ReadOnlyTarget::Refuse && platform::IsReadOnlyFile(path) && !platform::IsLink(path)) {
     throw FileException(platform::kErrorAccessDenied, path);
   }
-  const BesideFile claim(path);
-  const std::string& beside = claim.Path();
-  auto fail = [&] {
-    const uint32_t code = platform::LastError();
-    platform::RemoveFile(beside);
-    throw FileException(code, path);
-  };
-  if (!platform::WriteFile(beside, content)) fail();
-  if (!platform::RenameFile(beside, path)) fail();
+  WriteBesideAndRename(path, content, [](const std::string&) { return true; });
 }
 
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path) {
@@ -235,7 +256,7 @@ void WriteCheckedFile(uint32_t magic, std::string_view payload, const std::strin
   bytes += payload;
   std::string old;
   const bool isTheSame = ReadWholeFile(old, path) && old == bytes;
-  if (!isTheSame || !TouchFile(path, false)) ReplaceFile(path, bytes);
+  if (!isTheSame || platform::IsLink(path) || !TouchFile(path, false)) ReplaceFile(path, bytes);
 }
 
 // --- File
@@ -320,6 +341,7 @@ struct FileOrDirIterator::State {
   std::vector<std::string> names;
   size_t next = 0;
   uint32_t failureCode = 0;
+  uint32_t entryFailure = 0;
   FileOrDirInfo info;
 };
 
@@ -332,13 +354,17 @@ FileOrDirIterator::FileOrDirIterator(const std::string& pattern) : m_state(std::
 }
 
 uint32_t FileOrDirIterator::FailureCode() const { return m_state->failureCode; }
+uint32_t FileOrDirIterator::EntryFailure() const { return m_state->entryFailure; }
 
 FileOrDirIterator::~FileOrDirIterator() = default;
 
 const IFileOrDirInfo* FileOrDirIterator::Next() {
   while (m_state->next < m_state->names.size()) {
     const std::string& name = m_state->names[m_state->next++];
-    if (!platform::Stat(m_state->directory + "/" + name, m_state->info.info)) continue;  // gone meanwhile
+    m_state->info.info = {};
+    const bool isKnown = platform::Stat(m_state->directory + "/" + name, m_state->info.info);
+    m_state->entryFailure = isKnown ? 0 : platform::LastError();
+    if (m_state->entryFailure == platform::kErrorFileNotFound) continue;  // gone meanwhile, or a link to nothing
     m_state->info.info.name = name;
     m_state->info.info.isHidden = name.front() == '.';
     return &m_state->info;

@@ -22,8 +22,9 @@ class DirectoryTimes;
 
 bool FileExists(const std::string& path);  // a plain file that opens for reading: no directory, pipe, socket, device
 bool DeleteFile(const std::string& path);
-// A program stays executable; a read-only target is replaced like any other.
-bool CopyFile(const std::string& from, const std::string& to, bool failIfExists);
+// The copy bears the time at which the reading began, so that what is written into the source behind that is newer. A
+// program stays executable; a read-only target is replaced like any other, a link and not what it leads to.
+bool CopyFile(const std::string& from, const std::string& to, bool failIfExists, bool readOnly = false);
 bool CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 bool SetReadOnly(const std::string& path, bool readOnly);
@@ -126,8 +127,9 @@ class FileOrDirIterator {
  public:
   explicit FileOrDirIterator(const std::string& pattern);  // "dir/*"
   ~FileOrDirIterator();
-  const IFileOrDirInfo* Next();  // null at the end; valid until the next call
-  uint32_t FailureCode() const;  // of the system, when the directory could not be listed; else 0
+  const IFileOrDirInfo* Next();   // null at the end; valid until the next call
+  uint32_t FailureCode() const;   // of the system, when the directory could not be listed; else 0
+  uint32_t EntryFailure() const;  // the same of the entry that Next gave: then its name is all that is known of it
 
  private:
   struct State;

@@ -156,6 +156,22 @@ void ChangeReadOnly(const std::string& path, bool readOnly) {
   TraceWriter() << "Failure " << (readOnly ? "setting" : "clearing") << " read only status of file " << path << "\n";
 }
 
+namespace {
+
+// Whether two stamps are too near to each other to tell which file was written last: within a tick of the clock of
+// stamps, or where the file system of the source has a coarser scale, in a step of that.
+bool AreWithinTick(int64_t source, int64_t target) {
+  constexpr int64_t kSlowestTick = 200'000;  // 20 ms
+  return source <= target + kSlowestTick && source >= OnScaleOf(source, target) - kSlowestTick;
+}
+
+bool HoldTheSame(const std::string& path, const std::string& other) {
+  std::string content, otherContent;
+  return ReadWholeFile(content, path) && ReadWholeFile(otherContent, other) && content == otherContent;
+}
+
+}  // namespace
+
 bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::string& to, bool readOnly) {
   CreateDirectories(to, false);
   auto fail = [] {
@@ -163,17 +179,18 @@ bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::s
     return false;
   };
   platform::FileInfo source;
-  if (!platform::Stat(from, source)) return platform::IsNotFound(platform::LastError()) || fail();
+  if (!platform::Stat(from, source)) return platform::LastError() == platform::kErrorFileNotFound || fail();
   platform::FileInfo target;
   const bool exists = platform::Stat(to, target) && target.isPlain;
-  if (!source.isPlain || source.writeTime <= (exists ? target.writeTime : 0)) {
-    if (exists && readOnly && !target.isReadOnly) ChangeReadOnly(to, true);  // a run was killed behind its copy
+  if (!source.isPlain) return true;
+  if (exists && AreWithinTick(source.writeTime, target.writeTime)) {
+    if (source.size == target.size && HoldTheSame(from, to)) return true;
+  } else if (source.writeTime <= (exists ? target.writeTime : 0)) {
     return true;
   }
   leftovers.Beside(to);
   ChangeReadOnly(to, false);
-  if (!CopyFile(from, to, false)) return fail();
-  TouchFile(to, false);
+  if (!CopyFile(from, to, false, readOnly)) return fail();
   if (readOnly) ChangeReadOnly(to, true);
   return true;
 }
@@ -183,8 +200,20 @@ bool DeleteThoughReadOnly(const std::string& path) {
   return DeleteFile(path);
 }
 
-void DeleteReporting(const std::string& path) {
-  if (DeleteThoughReadOnly(path)) TraceWriter() << "Deleting " << path << "\n";
+bool DeleteReporting(const std::string& path) {
+  if (DeleteThoughReadOnly(path)) {
+    TraceWriter() << "Deleting " << path << "\n";
+    return true;
+  }
+  const uint32_t code = platform::LastError();
+  platform::FileInfo info;
+  if (platform::IsNotFound(code) || (platform::Stat(path, info) && info.isDirectory)) return true;  // no file of ours
+  TraceWriter() << "Error: Couldn't delete " << path << " : " << SystemErrorText(code) << "\n";
+  return false;
+}
+
+void RemoveLink(const std::string& path) {
+  if (platform::IsLink(path) && !platform::RemoveFile(path)) throw FileException(path);
 }
 
 }  // namespace qrex

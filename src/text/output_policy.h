@@ -55,7 +55,8 @@ class GeneratedFile : public IOutputStream {
   std::optional<uint32_t> m_failure;    // the error code of the first step that failed
 };
 
-// Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time.
+// Copies when `from` is newer than `to` (a missing file has time 0), and stamps the copy with the present time. Where
+// the stamps are too near to each other to tell, the contents decide.
 bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::string& to, bool readOnly);
 
 // As SetReadOnly; an existing file that refuses gets a "Failure setting/clearing read only status" line.
@@ -64,7 +65,10 @@ void ChangeReadOnly(const std::string& path, bool readOnly);
 // Clears the read-only flag and deletes; false when no file was deleted.
 bool DeleteThoughReadOnly(const std::string& path);
 
-// The same, and writes "Deleting " and the path when a file was deleted.
-void DeleteReporting(const std::string& path);
+// The same, and writes "Deleting " and the path when a file was deleted; false, with a message, when one stays.
+bool DeleteReporting(const std::string& path);
+
+// Where a tool is about to write: a link goes, so that what it leads to stays as it is. Raises FileException.
+void RemoveLink(const std::string& path);
 
 }  // namespace qrex

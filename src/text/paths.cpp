@@ -30,6 +30,12 @@ bool StartsWithIgnoringCase(std::string_view text, std::string_view prefix) {
   return text.size() >= prefix.size() && EqualIgnoringCase(text.substr(0, prefix.size()), prefix);
 }
 
+bool LeadsAbove(std::string_view path) {
+  if (path.find("..") == std::string_view::npos) return false;
+  const std::string collapsed = CollapseDots(path);
+  return collapsed == ".." || collapsed.starts_with("../");
+}
+
 bool IsAbsolutePath(std::string_view path) {
   return (!path.empty() && path[0] == '/') || (path.size() >= 4 && path[1] == ':' && path[2] == '/');
 }

@@ -8,6 +8,8 @@
 
 namespace qrex {
 
+// Whether a relative path leads, by its "..", above the folder that it begins in.
+bool LeadsAbove(std::string_view path);
 bool IsAbsolutePath(std::string_view path);
 std::string_view FileNameOf(std::string_view path);
 bool StemOf(std::string_view path, std::string& stem);  // false, `stem` untouched: no '.', or an empty stem

@@ -3,6 +3,7 @@
 
 #include <map>
 #include <string>
+#include <unordered_set>
 #include <vector>
 
 #include "macro/mpfw_parser.h"
@@ -54,6 +55,8 @@ struct ConfigSettings {
   mutable LeftoverSweep leftovers;
   mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
   mutable platform::ToolKeeper tools;
+  // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
+  std::unordered_set<std::string> made;
 
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };

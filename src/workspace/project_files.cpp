@@ -4,6 +4,7 @@
 
 #include "lex/literals.h"
 #include "platform/console.h"
+#include "platform/error.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
@@ -113,30 +114,35 @@ void ProjectParser::ParseSearch(ProjectFolder& folder, const std::string& direct
 // A directory that one root holds is searched under all of them; once, however many roots hold it.
 void ProjectParser::Find(Search& search, ProjectFolder& folder, const std::string& directory) {
   if (!search.searched.insert(directory).second) return;
+  RequireInTree(directory, m_entry);
   for (const std::string& root : m_project.settings->virtualTree) FindUnder(root, search, folder, directory);
 }
 
 void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFolder& folder,
                               const std::string& directory) {
   std::string searched = PathJoin(root, directory), realPath;
-  if (searched.empty()) searched = ".";  // the folder of the run, when the search leads above the root
-  if (!RealPathOf(searched, realPath)) return;
+  if (searched.empty()) searched = ".";  // the folder of the run
+  if (!RealPathOf(searched, realPath)) {
+    if (const uint32_t code = platform::LastError(); !platform::IsNotFound(code)) FailSearch(searched, code);
+    return;
+  }
   if (std::find(search.open.begin(), search.open.end(), realPath) != search.open.end()) return;  // a link to itself
   if (search.open.size() >= kMaxNesting || platform::IsStackShort())
     throw LexScannerException("Directories nested too deeply", current);
   search.open.push_back(realPath);
   std::vector<std::string> names;
   FileOrDirIterator entries(searched + "/*");
-  if (entries.FailureCode() != 0) {
-    throw LexScannerException("Couldn't list folder " + searched + " : " + SystemErrorText(entries.FailureCode()),
-                              current);
-  }
+  if (entries.FailureCode() != 0) FailSearch(searched, entries.FailureCode());
   while (const IFileOrDirInfo* entry = entries.Next()) {
     const std::string name = entry->Name();
     if (name == "." || name == ".." || entry->IsHidden() || entry->IsSystem()) continue;
-    const bool isWanted =
-        entry->IsDirectory() ? search.recurse && m_directoryFilter.Passes(name) : search.filter.Passes(name);
-    if (!isWanted) continue;
+    const bool isWantedFolder = search.recurse && m_directoryFilter.Passes(name);
+    const bool isWantedFile = search.filter.Passes(name);
+    if (entries.EntryFailure() != 0 && (isWantedFolder || isWantedFile)) {
+      throw LexScannerException(
+          "Couldn't read " + PathJoin(searched, name) + " : " + SystemErrorText(entries.EntryFailure()), current);
+    }
+    if (!(entry->IsDirectory() ? isWantedFolder : isWantedFile)) continue;
     if (!platform::IsValidUtf8(name)) {
       throw LexScannerException("Path is not valid UTF-8 : " + PathJoin(directory, name), current);
     }
@@ -153,6 +159,10 @@ void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFo
     search.matched.insert(&AddFile(folder, PathJoin(directory, name), name));
   }
   search.open.pop_back();
+}
+
+void ProjectParser::FailSearch(const std::string& folder, uint32_t code) const {
+  throw LexScannerException("Couldn't list folder " + folder + " : " + SystemErrorText(code), current);
 }
 
 void ProjectParser::FindInSubdirectory(Search& search, ProjectFolder& folder, const std::string& directory,
@@ -205,10 +215,19 @@ ProjectFolder& ProjectParser::FolderNamed(ProjectFolder& parent, const std::stri
   return made;
 }
 
+// What is made of a file stands at its path, below the folders of outputs.
+void ProjectParser::RequireInTree(const std::string& path, const char* position) const {
+  if (LeadsAbove(path)) throw LexScannerException("Path leads out of the tree : " + path, position);
+  if (m_project.usesQrex && IsAbsolutePath(path)) {
+    throw LexScannerException("Path of a translated file must be relative : " + path, position);
+  }
+}
+
 // A file that is named again stays in its first folder.
 ProjectFile& ProjectParser::AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName) {
   const auto place = m_project.filesByPath.lower_bound(path);
   if (place != m_project.filesByPath.end() && place->first == path) return *place->second;
+  RequireInTree(path, m_entry);
   auto made = std::make_unique<ProjectFile>();
   ProjectFile& file = *made;
   file.project = &m_project;

@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <unordered_map>
 
+#include "text/files.h"
 #include "text/paths.h"
 #include "workspace/switch_blocks.h"
 #include "workspace/workspace.h"
@@ -89,7 +90,11 @@ std::string Project::ListingHint(const ProjectFile& file) const {
   std::string path;
   int64_t line;
   if (!FindExpandedLine(settings->sourceFiles, file.listedAt, path, line)) return {};
-  const std::string listed = file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+  std::string listed = file.path + " is listed in " + path + "(" + std::to_string(line) + ")";
+  for (const std::string& root : settings->virtualTree) {
+    if (root == rootDir || !FileExists(PathJoin(root, file.path))) continue;
+    return listed + "; it is in " + root + ", but files of a project are read below its own root, " + rootDir;
+  }
   if (filePath.starts_with(PathJoin(rootDir, rootToProjDir) + "/")) return listed;
   return listed + ", and " + filePath + " does not stand below its $ROOT_TO_PROJDIR, \"" + rootToProjDir + "\"";
 }

@@ -72,6 +72,7 @@ void ProjectParser::ParseHeads() {
   SetTargetType(targetType);
   ReadHead("ROOT_TO_PROJDIR", m_project.rootToProjDir);
   const std::string& directory = m_project.rootToProjDir;
+  RequireInTree(directory, previous.text.begin);
   m_project.sourceDir = PathJoin(directory, "src");
   if (current.kind == kDollar) {
     ReadHead("PROJDIR_TO_ROOT", m_project.projDirToRoot);

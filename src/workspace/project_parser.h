@@ -81,7 +81,9 @@ class ProjectParser : public MpfwParser {
   };
   void Find(Search& search, ProjectFolder& folder, const std::string& directory);
   void FindUnder(const std::string& root, Search& search, ProjectFolder& folder, const std::string& directory);
+  [[noreturn]] void FailSearch(const std::string& folder, uint32_t code) const;
   void FindInSubdirectory(Search& search, ProjectFolder& folder, const std::string& directory, const std::string& name);
+  void RequireInTree(const std::string& path, const char* position) const;
   ProjectFile& AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName);
   ProjectFolder& FolderNamed(ProjectFolder& parent, const std::string& name, bool* isNew = nullptr);
   void ParseFileOptions(const Files& files);

@@ -31,7 +31,7 @@ class DependencyTest : public WorldTest {
  protected:
   DependencyTest() {
     settings.mode = RunMode::Build;
-    WriteProject("lib", "Static Library", "qrex { \"l.h\" }");
+    WriteProject("lib", "Static Library", "qrex { \"l.h\" \"l.cpp\" }");
     WriteProject("app", "qrex { \"a.h\" \"b.h\" \"c.h\" \"x.cpp\" \"y.cpp\" \"app.cpp\" }");
     EXPECT_TRUE(Load({"app", "lib"}) && workspace->CheckFileReferences()) << trace;
     StartBuild();
@@ -125,6 +125,14 @@ TEST_F(DependencyTest, DamagedFiles) {
   assertAbsent("*** Cannot find file gone.h\n");
   WriteDependencies(Text("app/a.h") + LittleEndian(5, 8) + LittleEndian(0xFFFFFFFF, 4) + Text("app/b.h"));
   assertAbsent("*** Error reading dep : Deserialisation error\n");
+  const std::string registered = "\x01" + Text("lib/l.cpp") + "\x01" + Text("l0") + '\0';
+  WriteDependencies(Entry("app/x.cpp", 5, {}) + Entry("lib/l.cpp", 5, {}) + '\0' + registered);  // of another project
+  assertAbsent("");
+  WriteDependencies(Entry("lib/l.h", 5, {}) + kNoRegistrations);
+  assertAbsent("");
+  WriteDependencies(Entry("app/x.cpp", 5, {"lib/l.cpp"}) + Entry("lib/l.cpp", 5, {}) + '\0' + registered);
+  StartBuild();
+  EXPECT_TRUE(LoadDependencyFile(*builder, "dep"));
   WriteDependencies(payload + "rest");
   StartBuild();
   EXPECT_TRUE(LoadDependencyFile(*builder, "dep"));

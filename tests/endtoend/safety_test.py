@@ -180,26 +180,54 @@ def a_long_chain_of_imports_works_or_is_refused(workspace):
         holds(workspace.run("all.qrex", "translateOnly=true"), "\nCompleted..")
 
 
-def a_folder_that_cannot_be_listed_is_told(binary):
-    library = os.environ.get("QREX_FAULTS")  # the superuser lists any folder: the call itself has to fail
-    folder = Path(__file__).resolve().parents[1] / "faults"
-    with Workspace(binary, {**FILES, "tree/app/src/app.qrpj": PROJECT.replace('"a.cpp"', '"*.cpp"')
-                            % ("app", "Debug", "x64")}) as workspace:
-        if not library:
-            library = str(workspace.path("inject.so"))
-            subprocess.run(["cc", "-shared", "-fPIC", "-o", library, folder / "inject.c", "-ldl"], check=True)
-        for call in ("opendir", "readdir"):
-            # A sanitizer wants to be the first library of the process.
-            sanitizer = os.environ.get("ASAN_OPTIONS", "") + ":verify_asan_link_order=0"
-            done = subprocess.run([binary, "all.qrex", "translateOnly=true"], cwd=workspace.folder, stdout=subprocess.PIPE,
-                                  text=True, env={**os.environ, "LD_PRELOAD": library, "FAULT_CALL": call, "FAULT_AT": "1",
-                                                  "FAULT_HOW": "fail", "FAULT_ERRNO": "13", "FAULT_STICKS": "1",
-                                                  "ASAN_OPTIONS": sanitizer})
-            equal(done.returncode, 1)
-            holds(done.stdout, "app.qrpj(5) : Couldn't list folder tree/app/src : Access is denied.\n")
+SEARCH = {**FILES, "tree/app/src/app.qrpj": PROJECT.replace('"a.cpp"', '"*.cpp"') % ("app", "Debug", "x64")}
+
+
+@in_workspace(SEARCH, "cc")
+def what_the_system_refuses_is_told(workspace):
+    library = os.environ.get("QREX_FAULTS")  # nothing is refused to the superuser: the call itself has to fail
+    if not library:
+        library = str(workspace.path("inject.so"))
+        source = Path(__file__).resolve().parents[1] / "faults/inject.c"
+        subprocess.run(["cc", "-shared", "-fPIC", "-o", library, source, "-ldl"], check=True)
+    workspace.run("all.qrex", "translateOnly=true")
+    refused = "app.qrpj(5) : Couldn't list folder tree/app/src : Access is denied.\n"
+    stays = "Error: Couldn't delete qrexsource/x64/Debug/app%s : Access is denied.\n"
+    for call, mode, told in (("opendir", "build", [refused]), ("readdir", "build", [refused]),
+                             ("unlink", "clean", [stays % ".qrexdep", stays % "/src/a.cpp", "\nCompleted with 0 warnings, 2 e"])):
+        # A sanitizer wants to be the first library of the process.
+        sanitizer = os.environ.get("ASAN_OPTIONS", "") + ":verify_asan_link_order=0"
+        holds(workspace.run("all.qrex", "translateOnly=true", f"mode={mode}", status=1, LD_PRELOAD=library, FAULT_CALL=call,
+                            FAULT_AT="1", FAULT_HOW="fail", FAULT_ERRNO="13", FAULT_STICKS="1", ASAN_OPTIONS=sanitizer), *told)
+
+
+@in_workspace(SEARCH)
+def what_a_search_cannot_read_is_told(workspace):
+    for name, target in (("gone.cpp", "none"), ("other.txt", "other.txt")):  # what is not there, and is not searched for
+        workspace.path(f"tree/app/src/{name}").symlink_to(target)
+    workspace.run("all.qrex", "translateOnly=true")
+    workspace.path("tree/app/src/loop.cpp").symlink_to("loop.cpp")
+    holds(workspace.run("all.qrex", "translateOnly=true", status=1), "app.qrpj(5) : Couldn't read tree/app/src/loop.cpp : ")
+
+
+@in_workspace({**FILES, "elsewhere": "theirs"}, "g++")
+def links_are_replaced_and_not_written_through(workspace):
+    workspace.run("all.qrex")
+    elsewhere = workspace.path("elsewhere")
+    elsewhere.chmod(0o444)
+    outputs = [workspace.path(name) for name in ("qrexsource/x64/Debug/app/src/a.cpp", "qrexsource/x64/Debug/app.qrexdep",
+                                                 "x64/Debug/app/a.o", "out/lib/x64/Debug/app", "out/source/app/src/app.qrpj")]
+    for link in (os.symlink, os.link):
+        for output in outputs:
+            output.unlink()
+            link(elsewhere, output)
+        workspace.append("tree/app/src/a.cpp", f"int by_{link.__name__};\n")
+        holds(workspace.run("all.qrex"), "\nCompleted..")
+        equal((elsewhere.read_text(), elsewhere.stat().st_mode & 0o777), ("theirs", 0o444))
+        equal([output for output in outputs if output.is_symlink() or output.samefile(elsewhere)], [])
 
 
 run_tests([names_do_not_run, sources_and_folders_are_names, a_quote_in_a_name_is_refused, builds_in_one_folder_follow_each_other,
            tools_speak_english, a_parent_that_ignores_the_end_of_children, files_of_ours_that_nobody_may_read_are_replaced,
            a_clock_that_was_ahead, writes_beyond_the_limit_of_file_sizes_fail, a_long_chain_of_imports_works_or_is_refused,
-           a_folder_that_cannot_be_listed_is_told])
+           what_the_system_refuses_is_told, what_a_search_cannot_read_is_told, links_are_replaced_and_not_written_through])

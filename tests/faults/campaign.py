@@ -24,6 +24,9 @@ import tempfile
 import time
 from pathlib import Path
 
+import layout
+import stamps
+
 HERE = Path(__file__).resolve().parent
 sys.path.insert(0, str(HERE.parent / "endtoend"))
 import signals  # noqa: E402
@@ -304,6 +307,18 @@ def rows(kind, folder, short, mounts):
         yield "disk full", [(full_disk, kind, folder / f"disk{size}", taken + 4 * size) for size in sizes]
 
 
+def all_rows(binary, library, folder, short, mounts):
+    """Name of the kind of run, name of the fault and a function for each disturbed run of it."""
+    for name in RUNS:
+        kind = Kind(binary, library, folder, name)
+        for fault, calls in rows(kind, folder, short, mounts):
+            yield name, fault, calls
+    kinds = {name: RUNS[name][0] for name in ("translate", "build")}
+    runs = stamps.Runs(binary, stamps.build_library(folder), run, outputs)
+    yield from stamps.rows(runs, folder / "build", folder, kinds, short)
+    yield from layout.rows(binary, library, folder, FAULTS, lambda count: some(count, 3 if short else 10**6))
+
+
 def build_library(folder):
     library = folder / "inject.so"
     subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, HERE / "inject.c", "-ldl"], check=True)
@@ -326,21 +341,19 @@ def main():
         if not mounts:
             print("full disks are left out: mount needs the superuser")
         with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
-            for name in RUNS:
-                kind = Kind(options.binary, library, folder, name)
-                for fault, calls in rows(kind, folder, options.short, mounts):
-                    if not calls:
-                        continue
-                    found = [text for text in pool.map(lambda call: call[0](*call[1:]), calls) if text]
-                    good = len(calls) - len(found)
-                    kept, broken = kept + good, broken + len(found)
-                    if options.markdown:
-                        verdict = f"{len(found)} broke a promise" if found else KEPT
-                        print(f"| {name} | {fault} | {len(calls)} | {verdict} |", flush=True)
-                    elif found or not options.short:
-                        print(f"{name:16} {fault:22} {good:5} of {len(calls)}", flush=True)
-                    for text in found[:20]:
-                        print(f"    {text}", flush=True)
+            for name, fault, calls in all_rows(options.binary, library, folder, options.short, mounts):
+                if not calls:
+                    continue
+                found = [text for text in pool.map(lambda call: call[0](*call[1:]), calls) if text]
+                good = len(calls) - len(found)
+                kept, broken = kept + good, broken + len(found)
+                if options.markdown:
+                    verdict = f"{len(found)} broke a promise" if found else KEPT
+                    print(f"| {name} | {fault} | {len(calls)} | {verdict} |", flush=True)
+                elif found or not options.short:
+                    print(f"{name:16} {fault:22} {good:5} of {len(calls)}", flush=True)
+                for text in found[:20]:
+                    print(f"    {text}", flush=True)
     finally:
         shutil.rmtree(folder, ignore_errors=True)
     print(f"{kept} passed, {broken} failed")

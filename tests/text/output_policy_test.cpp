@@ -172,6 +172,70 @@ TEST_F(OutputPolicyTest, CopiesWhatIsNewer) {
   EXPECT_EQ("...Copy file failed\n", trace);
 }
 
+// What the stamps cannot tell the contents do: within a tick, or in a step of a file system that keeps whole seconds.
+TEST_F(OutputPolicyTest, CopiesWhatDiffersWhereStampsAreNear) {
+  const auto set = [](const std::string& path, std::chrono::milliseconds behind) {
+    const auto second = std::chrono::floor<std::chrono::seconds>(std::filesystem::file_time_type::clock::now());
+    const auto even = second - std::chrono::seconds(100 + second.time_since_epoch().count() % 2);
+    std::filesystem::last_write_time(path, even + behind);
+  };
+  const struct {
+    int source, target;  // milliseconds behind an even second
+    bool isCopied;
+  } kRows[] = {{50, 50, true}, {50, 55, true}, {50, 100, false}, {0, 1900, true}, {0, 2100, false}, {1000, 1000, true}};
+  for (const auto& row : kRows) {
+    for (const char* text : {"new", "longer"}) {
+      Write("from", text);
+      Write("to", "old");
+      set("from", std::chrono::milliseconds(row.source));
+      set("to", std::chrono::milliseconds(row.target));
+      EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "to", true));
+      EXPECT_EQ(row.isCopied ? text : "old", Read("to")) << row.source << " " << row.target;
+      if (!row.isCopied) continue;
+      const int64_t copied = LastWriteTime("to");  // the same now: nothing is done
+      SetReadOnly("to", false);
+      set("to", std::chrono::milliseconds(row.source));
+      EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "to", true));
+      EXPECT_FALSE(IsReadOnly("to") || LastWriteTime("to") >= copied);
+    }
+  }
+  // A copy is as old as the begin of its reading; and what can't be looked for is told.
+  Write("large", std::string(32 << 20, 'x'));
+  SetAge("large", 10);
+  EXPECT_TRUE(CopyIfNewer(settings.leftovers, "large", "copy", false));
+  Write("behind", "");
+  EXPECT_LT(LastWriteTime("copy") + 20'000, LastWriteTime("behind"));
+  EXPECT_FALSE(CopyIfNewer(settings.leftovers, "from/x", "to", false));
+  EXPECT_EQ("...Copy file failed\n", trace);
+}
+
+// Of a link, symbolic or a further name, what it leads to stays as it is.
+TEST_F(OutputPolicyTest, ReplacesLinksAlone) {
+  for (const bool isSymbolic : {true, false}) {
+    for (int way = 0; way < 4; ++way) {
+      Write("elsewhere", "theirs");
+      SetReadOnly("elsewhere", true);
+      if (isSymbolic) {
+        std::filesystem::create_symlink("elsewhere", "out");
+      } else {
+        std::filesystem::create_hard_link("elsewhere", "out");
+      }
+      Write("from", "new");
+      SetAge("from", -100);
+      if (way == 0) EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "out", false));
+      if (way == 1) EXPECT_TRUE(DeleteReporting("out"));
+      if (way == 2) RemoveLink("out");
+      if (way == 3) ChangeReadOnly("out", false);
+      EXPECT_EQ("theirs", Read("elsewhere")) << way;
+      EXPECT_TRUE(IsReadOnly("elsewhere")) << way;
+      EXPECT_EQ(way == 3, std::filesystem::exists("out") && Read("out") == "theirs") << way;
+      std::filesystem::remove("out");
+      std::filesystem::remove("elsewhere");
+    }
+  }
+  EXPECT_EQ("Deleting out\nDeleting out\n", trace);
+}
+
 TEST_F(OutputPolicyTest, Deletes) {
   Write("x", "");
   ChangeReadOnly("x", true);

@@ -241,7 +241,7 @@ TEST_F(ProjectTest, Searches) {
   AssertTree("{ \"none\" { \"*\" * } }", "none{}");
   // Above the roots lies the folder of the run.
   Write("here.h", "");
-  AssertTree("{ \"../..\" { \"*.h\" } }", "..{../here.h}");
+  AssertError(std::string(kHeads) + "{ \"../..\" { \"*.h\" } }", "(3) : Path leads out of the tree : ..");
   settings.virtualTree = {"tree", "."};
   AssertTree("{ \"..\" { \"h*.h\" } }", "${here.h}");
   settings.virtualTree = {"tree", "more"};
@@ -331,9 +331,14 @@ TEST_F(ProjectTest, Messages) {
            {"{ \"a\" : exclude, }", "(3) : Unknown option : }"},
            {"{ \"a\" : +link { } }", "(3) : Expected 'cpp' when read link"},
            {"{ \"a\" { \"b\" }", "(3) : Expected quoted string when read EOS"},
+           {"{ \"../a\"\n\"../../up/a\" : exclude }", "(4) : Path leads out of the tree : ../up/a"},
+           {"{ \"../x\" {\n\"y/../../../a\" } }", "(4) : Path leads out of the tree : x/y/../../../a"},
+           {"qrex { \"/up/a\" }", "(3) : Path of a translated file must be relative : /up/a"},
        }) {
     AssertError(std::string(kHeads) + text, message);
   }
+  AssertError("$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"../app\" { }",
+              "(2) : Path leads out of the tree : ../app");
 }
 
 TEST_F(ProjectTest, Imports) {

@@ -280,15 +280,15 @@ bool CopySource(const ScannedFile& file, const std::string& target) {
   ChangeReadOnly(target, false);
   CreateDirectories(target, false);
   file.host.Settings().leftovers.Beside(target);
-  if (!CopyFile(file.SourcePath(), target, false)) {
+  const bool readOnly = file.host.Settings().makeTranslatedFilesReadOnly;
+  if (!CopyFile(file.SourcePath(), target, false, readOnly)) {
     const SystemException failure;
     TraceWriter() << "ERROR: Copy file " << file.SourcePath() << " to " << target << " failed\n";
     ReportSystemError(failure);
     TraceWriter() << Hint(file.file.project->ListingHint(file.file));
     return false;
   }
-  TouchFile(target, false);
-  if (file.host.Settings().makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+  if (readOnly) ChangeReadOnly(target, true);
   return true;
 }
 
