@@ -222,8 +222,12 @@ TEST_F(OutputPolicyTest, ReplacesLinksAlone) {
       }
       Write("from", "new");
       SetAge("from", -100);
-      if (way == 0) EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "out", false));
-      if (way == 1) EXPECT_TRUE(DeleteReporting("out"));
+      if (way == 0) {
+        EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "out", false));
+      }
+      if (way == 1) {
+        EXPECT_TRUE(DeleteReporting("out"));
+      }
       if (way == 2) RemoveLink("out");
       if (way == 3) ChangeReadOnly("out", false);
       EXPECT_EQ("theirs", Read("elsewhere")) << way;
