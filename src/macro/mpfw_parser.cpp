@@ -24,7 +24,7 @@ bool MpfwParser::Import(LSFrame&, const std::string& path, const char* position)
   if (!ResolveImport(expanded, found)) {
     throw LexScannerException("Couldn't open file " + expanded, position).WithHint(ImportHint(expanded));
   }
-  if (m_importDepth == 0) m_isTooDeep = false;
+  if (m_importDepth == 0) m_isTooDeep = m_isTooDeepTold = false;
   if (m_importDepth >= kMaxImportDepth || platform::IsStackShort()) {
     m_isTooDeep = true;
     throw LexScannerException("Imports nested too deeply" + CycleText(found), position);
