@@ -76,8 +76,8 @@ int main()
     {
         check();
     }
-    Unregister_Project_check();
     CheckForgotten();
+    Unregister_Project_check();
     CHECK(vesk::Find<vesk::ReflectedClass>("Linked") == nullptr, true);
     std::printf("%d checks, %d failures\n", g_checks, g_failures);
     return g_failures > 0;

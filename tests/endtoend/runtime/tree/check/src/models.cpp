@@ -102,12 +102,12 @@ void CheckSchemas()
     read.DestroyObject();
 
     // Behind a mark and the version of the form; what was written without them is read as well.
-    CHECK(vesk::xvector<vesk::octet_t>(whole.begin(), whole.begin() + 4), "[255,118,120,1]");
+    CHECK(vesk::xvector<vesk::octet_t>(whole.begin(), whole.begin() + 4), "[255,118,120,2]");
     Doc alone;
     const vesk::ptr<IDoc> unmarked = vesk::ReadObject<IDoc>(Written(vesk::pref<IDoc>(&alone)));
     CHECK(bool(unmarked), true);
     unmarked->DestroyObject();
-    whole[3] = 2;
+    whole[3] = 3;
     CHECK(Throws([&] { vesk::ReadObject<IDoc>(whole); }), true);
 }
 

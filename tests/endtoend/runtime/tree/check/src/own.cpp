@@ -8,6 +8,7 @@
 namespace vesk
 {
 XTarget* kinds_GetXTarget();
+XTarget* check_GetXTarget();
 }
 
 using namespace kinds;
@@ -244,9 +245,10 @@ void CheckProjects()
     CHECK(ErrorOf([&] { ar << doc; }), "none");
 }
 
-// Called when this project is not registered any more.
+// The last of all: this project is not registered any more behind it.
 void CheckForgotten()
 {
+    vesk::UnregisterTarget(vesk::check_GetXTarget());
     Holder holder;
     const vesk::ptr<IDoc> object(&holder);
     const vesk::xstring error = "class is not registered: Holder (call Register_Project_check() first)";
