@@ -127,7 +127,7 @@ def one_description_serves_every_compiler(binary):
                     XmlTree.parse(path)
             equal(len({path.suffix for path in generated} & {".dsp", ".vcproj", ".vcxproj", ".sln", ".cbp"}), 5)
             # Each has its own switches and none of another's.
-            for suffix, own in ((".dsp", "/GX"), (".vcproj", 'ExceptionHandling="1"'), (".vcxproj", ">Sync<"),
+            for suffix, own in ((".dsp", "/EHsc"), (".vcproj", 'ExceptionHandling="1"'), (".vcxproj", ">Sync<"),
                                 (".cbp", '"-std=c++17"')):
                 text = workspace.path(program + suffix).read_text(encoding="utf-8-sig")
                 holds(text, own)
