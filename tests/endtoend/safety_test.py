@@ -174,7 +174,7 @@ IMPORTS = 10000
                        **{f"tree/app/src/h{i}.h": f'@import "h{i + 1}.h"\n' for i in range(IMPORTS)}})
 def a_long_chain_of_imports_works_or_is_refused(workspace):
     output = workspace.shell("(ulimit -v 300000; Qrex all.qrex translateOnly=true) || echo status $?")
-    if "status" in output:
+    if "status" in output and "AddressSanitizer failed to allocate" not in output:  # whose own memory is above the limit
         holds(output, ".h(1) : error : ", " nested too deeply\n", "status 1\n")
     for _ in range(2):
         holds(workspace.run("all.qrex", "translateOnly=true"), "\nCompleted..")
