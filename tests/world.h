@@ -10,7 +10,7 @@
 #include <string>
 #include <string_view>
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 #include "text/files.h"
 #include "workspace/workspace.h"
 

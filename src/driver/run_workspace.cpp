@@ -5,8 +5,8 @@
 #include <unordered_set>
 #include <vector>
 
-#include "build/project_builder.h"
-#include "build/tools.h"
+#include "builder/project_builder.h"
+#include "builder/tools.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"

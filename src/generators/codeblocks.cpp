@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "build/tools.h"
+#include "builder/tools.h"
 #include "generators/common.h"
 #include "generators/xml.h"
 #include "text/numbers.h"

@@ -2,7 +2,7 @@
 
 #include <initializer_list>
 
-#include "build/tools.h"
+#include "builder/tools.h"
 #include "generators/common.h"
 #include "text/paths.h"
 #include "text/version.h"

@@ -1,5 +1,5 @@
 // The readers of files that earlier runs wrote: the dependency file's payload and projects.guids.
-#include "build/dependency_file.h"
+#include "builder/dependency_file.h"
 #include "fuzz/fuzz_world.h"
 
 using namespace qrex;

@@ -1,5 +1,5 @@
 // What tools print: messages are counted, and those about generated files are followed back to their source.
-#include "build/tool_output.h"
+#include "builder/tool_output.h"
 #include "fuzz/fuzz_world.h"
 
 using namespace qrex;

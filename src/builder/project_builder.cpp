@@ -1,12 +1,12 @@
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 #include <algorithm>
 #include <utility>
 
-#include "build/dependency_file.h"
-#include "build/reflection_tails.h"
-#include "build/staleness.h"
-#include "build/tools.h"
+#include "builder/dependency_file.h"
+#include "builder/reflection_tails.h"
+#include "builder/staleness.h"
+#include "builder/tools.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/output_policy.h"

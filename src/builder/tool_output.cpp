@@ -1,4 +1,4 @@
-#include "build/tool_output.h"
+#include "builder/tool_output.h"
 
 #include <algorithm>
 

@@ -1,4 +1,4 @@
-#include "build/run_command.h"
+#include "builder/run_command.h"
 
 #include <cerrno>
 

@@ -6,7 +6,7 @@
 #include <string>
 #include <string_view>
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 namespace qrex {
 

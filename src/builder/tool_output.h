@@ -3,7 +3,7 @@
 
 #include <string_view>
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 namespace qrex {
 

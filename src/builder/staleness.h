@@ -3,7 +3,7 @@
 
 #include <cstdint>
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 namespace qrex {
 

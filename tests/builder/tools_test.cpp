@@ -2,10 +2,10 @@
 // inputs of a link. Scripts stand for the tools: they note how they were called, print what a test told them to, and
 // end as told.
 
-#include "build/tools.h"
+#include "builder/tools.h"
 
-#include "build/run_command.h"
-#include "build/tool_output.h"
+#include "builder/run_command.h"
+#include "builder/tool_output.h"
 #include "message_of.h"
 #include "text/paths.h"
 #include "translator/file/translate_file.h"

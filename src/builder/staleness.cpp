@@ -1,4 +1,4 @@
-#include "build/staleness.h"
+#include "builder/staleness.h"
 
 #include <algorithm>
 

@@ -1,10 +1,10 @@
 // Compilers, assembler, resource compiler. The linker stands in link.cpp.
 
-#include "build/tools.h"
+#include "builder/tools.h"
 
-#include "build/run_command.h"
-#include "build/tool_names.h"
-#include "build/tool_output.h"
+#include "builder/run_command.h"
+#include "builder/tool_names.h"
+#include "builder/tool_output.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"

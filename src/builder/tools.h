@@ -5,7 +5,7 @@
 #include <string>
 #include <vector>
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 namespace qrex {
 

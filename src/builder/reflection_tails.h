@@ -7,7 +7,7 @@
 // outputs agree with these. Whatever does not agree when they are saved is stale in the next run.
 #pragma once
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 namespace qrex {
 

@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <set>
 
-#include "build/run_command.h"
-#include "build/tool_names.h"
-#include "build/tools.h"
+#include "builder/run_command.h"
+#include "builder/tool_names.h"
+#include "builder/tools.h"
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/output_policy.h"

@@ -1,4 +1,4 @@
-#include "build/dependency_file.h"
+#include "builder/dependency_file.h"
 
 #include <algorithm>
 #include <vector>

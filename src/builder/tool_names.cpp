@@ -1,4 +1,4 @@
-#include "build/tool_names.h"
+#include "builder/tool_names.h"
 
 #include "text/numbers.h"
 

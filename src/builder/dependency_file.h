@@ -10,7 +10,7 @@
 
 #include <string>
 
-#include "build/project_builder.h"
+#include "builder/project_builder.h"
 
 namespace qrex {
 

@@ -1,7 +1,7 @@
 // The dependency file against bytes written by hand, and what it makes stale.
 
-#include "build/dependency_file.h"
-#include "build/staleness.h"
+#include "builder/dependency_file.h"
+#include "builder/staleness.h"
 #include "driver/run_workspace.h"
 #include "message_of.h"
 #include "world_fixture.h"

@@ -1,4 +1,4 @@
-#include "build/reflection_tails.h"
+#include "builder/reflection_tails.h"
 
 #include "translator/file/translate_file.h"
 
