@@ -95,19 +95,20 @@ bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile*
   WriteHeading("\n");
   if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
   PrepareFiles(dependencyFile);
-  bool result = true;
   try {
-    result = ProcessFiles(singleFile);
+    for (ScannedFile* file : scanned) ProcessFile(*file, singleFile);
+    scheduler.WaitForAll();
     if (!project.exported && isBuild) {
       ReportUnregistered();
-      if (!settings.translateOnly && result) result = LinkIfStale();
+      if (!settings.translateOnly && !m_hasFailed) LinkIfStale();
     }
+    scheduler.WaitForAll();
   } catch (const IException&) {
     Save(dependencyFile);
     throw;
   }
   Save(dependencyFile);
-  return result;
+  return !m_hasFailed;
 }
 
 void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
@@ -149,23 +150,14 @@ void ProjectBuilder::ReadTimes() {
     file->sourceTime = found[at++];
     file->targetTime = found[at++];
   }
-  for (; at < paths.size(); ++at) m_objectTimes.emplace(std::move(paths[at]), found[at]);
+  for (; at < paths.size(); ++at) m_objects.try_emplace(std::move(paths[at]), Object{found[at]});
 }
 
-bool ProjectBuilder::ProcessFiles(const ProjectFile* singleFile) {
-  bool result = true;
-  for (ScannedFile* file : scanned) {
-    if (!ProcessFile(*file, singleFile)) result = false;
-  }
-  return result;
-}
-
-bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
+void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
   const FileKind kind = file.file.kind;
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
-  bool result = true;
   if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
   if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.translated) {
     file.needsWriting = TailsMoved(file);
@@ -173,11 +165,10 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
   if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.translationTime == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
-    result = CompileResourceIfStale(file);
+    CompileResourceIfStale(file);
   }
-  if (RunsTools() && HasObject(file.file) && isWanted) result = CompileIfStale(file);
+  if (RunsTools() && HasObject(file.file) && isWanted) CompileIfStale(file);
   if (kind == FileKind::Cpp && !file.translated) MarkRegistered(file);
-  return result;
 }
 
 // What no run has translated registers something or not: the main source, which is to be compiled alone, has to know.
@@ -188,23 +179,35 @@ void ProjectBuilder::LearnNames(ScannedFile& file) {
   file.needsWriting = needsWriting;
 }
 
-bool ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
+void ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
   const int64_t resourceTime = LastWriteTime(ResourceObjectPath(*this, file.file));
-  if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return true;
-  return CompileResource(*this, file);
+  if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return;
+  scheduler.Add(ResourceStep(*this, file), [this](bool succeeded) { m_hasFailed = m_hasFailed || !succeeded; });
 }
 
-bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
-  const std::string object = ObjectPath(*this, file.file);
-  const auto [known, isNew] = m_objectTimes.try_emplace(object);
-  int64_t& objectTime = known->second;
-  if (isNew) objectTime = times.LastWriteTime(object);
-  if (LatestTargetTime(*this, file) < objectTime && !LiesAhead(*this, objectTime)) return true;
+void ProjectBuilder::CompileIfStale(ScannedFile& file) {
+  const std::string path = ObjectPath(*this, file.file);
+  const auto [known, isNew] = m_objects.try_emplace(path);
+  Object& object = known->second;
+  if (!object.source) object.source = &file.file;
+  if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
+  if (isNew) object.time = times.LastWriteTime(path);
+  if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
   BringUpToDate(file);
-  const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
-  objectTime = times.LastWriteTime(object);
-  settings.made.insert(object);
-  return compiled;
+  scheduler.Add(file.file.kind == FileKind::Asm ? AssembleStep(*this, file) : CompileStep(*this, file),
+                [this, path, &object](bool succeeded) {
+                  m_hasFailed = m_hasFailed || !succeeded;
+                  object.time = times.LastWriteTime(path);
+                  settings.made.insert(path);
+                });
+}
+
+// One of them would take the other's place in the target.
+void ProjectBuilder::ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other) {
+  TraceWriter() << "ERROR: No object can be made of " << file.path << " : " << path << " is that of " << other.path
+                << "\n";
+  ++errorCount;
+  m_hasFailed = true;
 }
 
 namespace {
@@ -229,14 +232,14 @@ void ProjectBuilder::ReportUnregistered() const {
   }
 }
 
-bool ProjectBuilder::LinkIfStale() {
-  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return true;  // no target
+void ProjectBuilder::LinkIfStale() {
+  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return;  // no target
   const std::string target = TargetPath(*this);
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
   auto timeOf = [&](const std::string& input) {
-    const auto known = m_objectTimes.find(input);
-    return known == m_objectTimes.end() ? LastWriteTime(input) : known->second;
+    const auto known = m_objects.find(input);
+    return known == m_objects.end() ? LastWriteTime(input) : known->second.time;
   };
   std::vector<std::string> watched = LibrariesOfSwitches(*this);
   watched.insert(watched.end(), inputs.begin(), inputs.end());
@@ -245,10 +248,11 @@ bool ProjectBuilder::LinkIfStale() {
     return time > targetTime || (time == targetTime && settings.made.contains(input));
   };
   const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), isLater);
-  if (isCurrent && !LiesAhead(*this, targetTime)) return true;
-  if (!MakeTarget(*this, target, inputs)) return false;
-  settings.made.insert(target);
-  return true;
+  if (isCurrent && !LiesAhead(*this, targetTime)) return;
+  scheduler.Add(TargetStep(*this, target, inputs), [this, target](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    if (succeeded) settings.made.insert(target);
+  });
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.

@@ -9,6 +9,7 @@
 #include <unordered_map>
 #include <vector>
 
+#include "builder/scheduler.h"
 #include "text/files.h"
 #include "translator/symbols/scanned_file.h"
 #include "workspace/workspace.h"
@@ -63,25 +64,32 @@ class ProjectBuilder : public TranslationHost {
   bool hasStaleFiles = false;  // as judged from the dependency file and the times
   int64_t errorCount = 0;
   int64_t warningCount = 0;
+  Scheduler scheduler{settings.tools, 1};
 
  private:
+  struct Object {
+    int64_t time = 0;
+    const ProjectFile* source = nullptr;
+  };
+
   void WriteHeading(std::string_view end) const;
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
-  bool ProcessFiles(const ProjectFile* singleFile);
-  bool ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
+  void ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
   void LearnNames(ScannedFile& file);
-  bool CompileResourceIfStale(ScannedFile& file);
-  bool CompileIfStale(ScannedFile& file);
+  void CompileResourceIfStale(ScannedFile& file);
+  void CompileIfStale(ScannedFile& file);
+  void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
-  bool LinkIfStale();
+  void LinkIfStale();
   const ScannedFile* FileOfPosition(const char* position) const;  // whose source text holds it; or null
   void Save(const std::string& dependencyFile);
 
   const std::string m_translationDirectory, m_intermediateDirectory;
   std::map<guid, std::string> m_guidOwners;
-  std::unordered_map<std::string, int64_t> m_objectTimes;  // as the compile steps know them
+  std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
+  bool m_hasFailed = false;                           // a step has
   size_t m_nextFileIndex = 0;
   mutable const ScannedFile* m_lastPositioned = nullptr;
   mutable std::unordered_map<const ScannedFile*, LineStarts> m_lineStarts;  // of those that messages were about

@@ -2,7 +2,9 @@
 
 #include "builder/tools.h"
 
-#include "builder/run_command.h"
+#include <utility>
+
+#include "builder/build_step.h"
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/files.h"
@@ -85,64 +87,80 @@ std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file,
   return text.TakeText();
 }
 
-// False when the tool could not be run at all: the trace log has told why.
-bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& responseFile, const std::string& text,
-                       const std::string& command, std::string& output, int& returnCode) {
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.output = &output;
-  options.errorsIntoOutput = IsGccFamily(builder.settings.compiler);  // where that family writes its messages
-  if (options.echo) TraceWriter() << responseFile << " = " << text << "\n";
-  try {
-    const CommandFile response(builder.settings.leftovers, responseFile, text);
-    if (RunCommand(builder.settings.tools, command + " @\"" + responseFile + "\"", returnCode, options)) return true;
-    TraceWriter() << responseFile << ": " << text << "\n";
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
-  }
-  return false;
+// Where a step puts what its tool reads. Steps that may run at once must not share it.
+std::string ResponseFile(const ProjectBuilder& builder, std::string_view tool, const std::string& object) {
+  if (builder.scheduler.Overlaps()) return object + ".rsp";
+  return builder.IntermediateDirectory() + "/" + std::string(tool) + ".rsp";
 }
 
-// Runs a compiler or assembler and lets its output decide. The return code matters only where it says that the tool did
-// not come to its own end and, in the gcc family, that it failed without a message of the known forms.
-bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::string& responseFile,
-                const std::string& text, const std::string& command) {
-  const int64_t errorsBefore = builder.errorCount;
-  const bool isGcc = IsGccFamily(builder.settings.compiler);
-  std::string output;
-  int returnCode = 0;
-  RemoveLink(ObjectPath(builder, file));
-  try {
-    ToolOutputs object(builder.settings, {ObjectPath(builder, file)}, {responseFile});
-    const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
-    if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) {
-      return object.Keep();
+// A compiler or assembler makes an object. Its output decides; the return code matters only where it says that the tool
+// did not come to its own end and, in the gcc family, that it failed without a message of the known forms.
+class ObjectStep : public BuildStep {
+ public:
+  struct Call {
+    std::string_view verb;  // told with diagnostics
+    std::string input, object;
+    std::string responseFile, text;
+    std::string command;
+    std::string hint;  // if it fails
+  };
+  ObjectStep(ProjectBuilder& builder, const ProjectFile& file, Call call)
+      : m_builder(builder), m_file(file), m_call(std::move(call)) {}
+
+  std::optional<Command> Prepare() override {
+    if (std::exchange(m_hasBegun, true)) return std::nullopt;
+    const ConfigSettings& settings = m_builder.settings;
+    if (settings.diagnostics) TraceWriter() << m_call.verb << " " << m_file.path << "\n";
+    if (!ToolsTake(m_builder, {m_call.input, m_call.object})) return std::nullopt;
+    RemoveLink(m_call.object);
+    try {
+      m_outputs.emplace(settings, std::vector{m_call.object}, std::vector{m_call.responseFile});
+      if (settings.diagnostics) TraceWriter() << m_call.responseFile << " = " << m_call.text << "\n";
+      m_response.emplace(settings.leftovers, m_call.responseFile, m_call.text);
+    } catch (const FileException& exception) {
+      TraceWriter() << "Error: " << exception << "\n";
+      m_outputs.reset();
+      CountFailure();
+      return std::nullopt;
     }
+    return Command{.line = m_call.command + " @\"" + m_call.responseFile + "\"",
+                   .echo = settings.diagnostics,
+                   .capturesOutput = true,
+                   .errorsIntoOutput = IsGcc()};  // where that family writes its messages
+  }
+
+  void Finish(const CommandResult& result) override {
+    m_response.reset();
+    if (!result.succeeded) TraceWriter() << m_call.responseFile << ": " << m_call.text << "\n";
+    const ToolMessages found = ScanToolOutput(m_builder, result.output);
+    m_builder.errorCount += found.errors;
+    m_builder.warningCount += found.warnings;
+    const bool endedItself = result.succeeded && result.end.IsNormal();
+    m_hasSucceeded = endedItself && found.errors == 0 && !(IsGcc() && result.ReturnCode() != 0);
     // A tool that came to its own end clears away what it could not finish; gcc's driver may have been the one to end.
-    if (ran && !isGcc && !IsAbnormalEnd(returnCode)) object.Keep();
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
+    if (m_hasSucceeded || (endedItself && !IsGcc())) m_outputs->Keep();
+    m_outputs.reset();
+    if (m_hasSucceeded) return;
+    if (found.errors == 0 && IsGcc() && result.ReturnCode() != 0) {
+      TraceWriter() << "Return code : " << result.ReturnCode() << "\n";
+    }
+    CountFailure(found.errors);
   }
-  if (builder.errorCount == errorsBefore) {
-    if (isGcc && returnCode != 0) TraceWriter() << "Return code : " << returnCode << "\n";
-    ++builder.errorCount;
+
+ private:
+  bool IsGcc() const { return IsGccFamily(m_builder.settings.compiler); }
+  void CountFailure(int64_t errors = 0) {
+    if (errors == 0) ++m_builder.errorCount;
+    if (!m_call.hint.empty()) TraceWriter() << Hint(m_call.hint);
   }
-  return false;
-}
 
-}  // namespace
-
-bool CompileFile(ProjectBuilder& builder, ScannedFile& scanned) {
-  const ProjectFile& file = scanned.file;
-  const std::string input = builder.project.usesQrex ? builder.TranslatedPath(scanned) : scanned.SourcePath();
-  if (builder.settings.diagnostics) TraceWriter() << "Compiling " << file.path << "\n";
-  if (!ToolsTake(builder, {input, ObjectPath(builder, file)})) return false;
-  return MakeObject(builder, file, builder.IntermediateDirectory() + "/compiler.rsp",
-                    CompilerText(builder, file, input),
-                    "cmd /c " + std::string(CompilerOf(builder.settings.compiler).compile));
-}
-
-namespace {
+  ProjectBuilder& m_builder;
+  const ProjectFile& m_file;
+  const Call m_call;
+  std::optional<ToolOutputs> m_outputs;
+  std::optional<CommandFile> m_response;
+  bool m_hasBegun = false;
+};
 
 bool IsFirstOfItsKind(const ProjectBuilder& builder, const ScannedFile& scanned) {
   for (const ScannedFile* file : builder.scanned) {
@@ -151,43 +169,81 @@ bool IsFirstOfItsKind(const ProjectBuilder& builder, const ScannedFile& scanned)
   return false;
 }
 
+class ResourceObjectStep : public BuildStep {
+ public:
+  ResourceObjectStep(ProjectBuilder& builder, const ScannedFile& file)
+      : m_builder(builder), m_file(file), m_output(ResourceObjectPath(builder, file.file)) {}
+
+  std::optional<Command> Prepare() override {
+    if (std::exchange(m_hasBegun, true)) return std::nullopt;
+    MemoryTextWriter line;
+    line << "rc.exe ";
+    WriteResourceSwitches(line, m_builder.config);
+    line << " /fo\"" << m_output << "\" \"" << m_file.SourcePath() << "\"";
+    TraceWriter() << "Compiling resource file " << m_file.file.path << "\n";
+    if (!ToolsTake(m_builder, {m_file.SourcePath(), m_output})) return std::nullopt;
+    RemoveLink(m_output);
+    try {
+      m_outputs.emplace(m_builder.settings, std::vector{m_output}, std::vector<std::string>());
+    } catch (const FileException& exception) {
+      TraceWriter() << "Error: " << exception << "\n";
+      ++m_builder.errorCount;
+      return std::nullopt;
+    }
+    return Command{.line = line.TakeText(), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
+  }
+
+  void Finish(const CommandResult& result) override {
+    m_hasSucceeded = result.succeeded;
+    if (m_hasSucceeded) m_outputs->Keep();
+    m_outputs.reset();
+    if (!m_hasSucceeded) ++m_builder.errorCount;
+  }
+
+ private:
+  ProjectBuilder& m_builder;
+  const ScannedFile& m_file;
+  const std::string m_output;
+  std::optional<ToolOutputs> m_outputs;
+  bool m_hasBegun = false;
+};
+
 }  // namespace
 
-bool AssembleFile(ProjectBuilder& builder, ScannedFile& scanned) {
-  const std::string directory = builder.IntermediateDirectory();
-  const std::string input = builder.TranslatedPath(scanned);
-  if (builder.settings.diagnostics) TraceWriter() << "Assembling " << scanned.file.path << "\n";
-  if (!ToolsTake(builder, {input, ObjectPath(builder, scanned.file)})) return false;
-  const std::string assembler = builder.config.platform == "Win64" ? "ml64" : "ml /coff";
-  const bool assembled =
-      MakeObject(builder, scanned.file, directory + "/masm.rsp", " /Fo\"" + directory + "/\" \"" + input + "\"",
-                 "cmd /c " + assembler + " /c /Cx /nologo");
-  if (!assembled && IsGccFamily(builder.settings.compiler) && IsFirstOfItsKind(builder, scanned)) {
-    TraceWriter() << Hint("an .asm is given to " + assembler + "; this compiler has no assembler of its own for it");
-  }
-  return assembled;
+std::unique_ptr<BuildStep> CompileStep(ProjectBuilder& builder, const ScannedFile& scanned) {
+  const ProjectFile& file = scanned.file;
+  const std::string object = ObjectPath(builder, file);
+  const std::string input = builder.project.usesQrex ? builder.TranslatedPath(scanned) : scanned.SourcePath();
+  return std::make_unique<ObjectStep>(
+      builder, file,
+      ObjectStep::Call{.verb = "Compiling",
+                       .input = input,
+                       .object = object,
+                       .responseFile = ResponseFile(builder, "compiler", object),
+                       .text = CompilerText(builder, file, input),
+                       .command = "cmd /c " + std::string(CompilerOf(builder.settings.compiler).compile),
+                       .hint = {}});
 }
 
-bool CompileResource(ProjectBuilder& builder, ScannedFile& scanned) {
-  MemoryTextWriter command;
-  command << "rc.exe ";
-  WriteResourceSwitches(command, builder.config);
-  command << " /fo\"" << ResourceObjectPath(builder, scanned.file) << "\" \"" << scanned.SourcePath() << "\"";
-  TraceWriter() << "Compiling resource file " << scanned.file.path << "\n";
-  if (!ToolsTake(builder, {scanned.SourcePath(), ResourceObjectPath(builder, scanned.file)})) return false;
-  RemoveLink(ResourceObjectPath(builder, scanned.file));
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.failOnNonZero = true;
-  int returnCode;
-  try {
-    ToolOutputs resource(builder.settings, {ResourceObjectPath(builder, scanned.file)}, {});
-    if (RunCommand(builder.settings.tools, command.TakeText(), returnCode, options)) return resource.Keep();
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
-  }
-  ++builder.errorCount;
-  return false;
+std::unique_ptr<BuildStep> AssembleStep(ProjectBuilder& builder, const ScannedFile& scanned) {
+  const std::string object = ObjectPath(builder, scanned.file), input = builder.TranslatedPath(scanned);
+  const std::string assembler = builder.config.platform == "Win64" ? "ml64" : "ml /coff";
+  const bool isHinted = IsGccFamily(builder.settings.compiler) && IsFirstOfItsKind(builder, scanned);
+  return std::make_unique<ObjectStep>(
+      builder, scanned.file,
+      ObjectStep::Call{
+          .verb = "Assembling",
+          .input = input,
+          .object = object,
+          .responseFile = ResponseFile(builder, "masm", object),
+          .text = " /Fo\"" + builder.IntermediateDirectory() + "/\" \"" + input + "\"",
+          .command = "cmd /c " + assembler + " /c /Cx /nologo",
+          .hint = isHinted ? "an .asm is given to " + assembler + "; this compiler has no assembler of its own for it"
+                           : std::string()});
+}
+
+std::unique_ptr<BuildStep> ResourceStep(ProjectBuilder& builder, const ScannedFile& scanned) {
+  return std::make_unique<ResourceObjectStep>(builder, scanned);
 }
 
 }  // namespace qrex

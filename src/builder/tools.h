@@ -1,7 +1,7 @@
-// The tools that a build runs. Each call echoes its command, counts errors and warnings in the builder, and answers
-// false on failure.
+// The tools that a build runs, and the steps in which it runs them.
 #pragma once
 
+#include <memory>
 #include <string>
 #include <vector>
 
@@ -27,16 +27,14 @@ std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file);
 std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile& file);
 std::string TargetPath(const ProjectBuilder& builder);
 
-bool CompileFile(ProjectBuilder& builder, ScannedFile& file);
-bool AssembleFile(ProjectBuilder& builder, ScannedFile& file);
-bool CompileResource(ProjectBuilder& builder, ScannedFile& file);
+std::unique_ptr<BuildStep> CompileStep(ProjectBuilder& builder, const ScannedFile& file);
+std::unique_ptr<BuildStep> AssembleStep(ProjectBuilder& builder, const ScannedFile& file);
+std::unique_ptr<BuildStep> ResourceStep(ProjectBuilder& builder, const ScannedFile& file);
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder);
 // What the linker switches name as libraries, in the gcc family: the target is stale when one of them is newer, as with
 // an input.
 std::vector<std::string> LibrariesOfSwitches(const ProjectBuilder& builder);
-bool MakeTarget(ProjectBuilder& builder, const std::string& target,
-                const std::vector<std::string>& inputs);  // the two:
-bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs);
-bool EmbedManifest(ProjectBuilder& builder);
+// Links, and embeds the manifest: a target without it must not pass for a good one.
+std::unique_ptr<BuildStep> TargetStep(ProjectBuilder& builder, std::string target, std::vector<std::string> inputs);
 
 }  // namespace qrex

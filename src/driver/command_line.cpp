@@ -102,7 +102,7 @@ void CommandLine::RunParallelBuild() {
   }
   TraceWriter() << "\n" << command << "\n";
   ScopeTimer timer;
-  const int result = platform::RunCommand(m_settings.tools, command);
+  const int result = m_settings.tools.Run({.line = command}).end.InterpreterCode();
   m_settings.tools.Stop();
   if (result != 0) TraceWriter() << command << " failed with error code " << result << "\n";
   timer.Stop();

@@ -446,7 +446,7 @@ void WaitForOtherBuilds(platform::FolderLock& folder) {
 
 // The keeper shares the lock: the next build must not find it held any more.
 struct KeeperEnd {
-  platform::ToolKeeper& tools;
+  platform::Processes& tools;
   ~KeeperEnd() { tools.Stop(); }
 };
 

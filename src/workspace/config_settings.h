@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "macro/mpfw_parser.h"
+#include "platform/process.h"
 #include "platform/system.h"
-#include "platform/tool_keeper.h"
 #include "text/files.h"
 #include "text/output_notes.h"
 #include "workspace/compilers.h"
@@ -54,7 +54,7 @@ struct ConfigSettings {
   // Whoever may read the settings may write files and run tools.
   mutable LeftoverSweep leftovers;
   mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
-  mutable platform::ToolKeeper tools;
+  mutable platform::Processes tools;
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
 
