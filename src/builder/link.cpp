@@ -110,15 +110,15 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
                           const std::vector<std::string>& inputs) {
   std::string text;
   if (builder.project.targetType != TargetType::StaticLibrary) {
-    text += "-o " + QuotedInput(builder.settings, target);
+    text += "-o " + QuotedInput(builder.settings.compiler, target);
     if (builder.project.targetType == TargetType::DynamicLinkLibrary) {
       const std::string name(FileNameOf(target));
       const bool isOneWord = name.find(',') == std::string::npos;  // a comma would end it behind -Wl
-      text += " -shared " + (isOneWord ? Quoted(builder.settings, "-Wl,-soname," + name)
-                                       : "-Xlinker -soname -Xlinker " + Quoted(builder.settings, name));
+      text += " -shared " + (isOneWord ? Quoted(builder.settings.compiler, "-Wl,-soname," + name)
+                                       : "-Xlinker -soname -Xlinker " + Quoted(builder.settings.compiler, name));
     }
   }
-  for (const std::string& input : inputs) text += " " + QuotedInput(builder.settings, input);
+  for (const std::string& input : inputs) text += " " + QuotedInput(builder.settings.compiler, input);
   if (builder.project.targetType == TargetType::StaticLibrary) return text;
   for (const std::string& library : LibrariesOfSubprojects(builder)) text += " \"" + library + "\"";
   text += " -Xlinker -rpath -Xlinker '$ORIGIN'";  // the targets of a configuration share a folder, wherever it is moved
@@ -136,16 +136,10 @@ std::string LinkCommand(const ProjectBuilder& builder, const std::string& target
   if (!isStatic) return std::string(compiler.link);
   const std::string command(compiler.archive);
   if (compiler.family != CompilerFamily::Gcc) return command;
-  return command + " \"" + AsInput(builder.settings, target) + "\"";
+  return command + " \"" + AsInput(builder.settings.compiler, target) + "\"";
 }
 
 }  // namespace
-
-std::string TargetPath(const ProjectBuilder& builder) {
-  const Project& project = builder.project;
-  if (IsGccFamily(builder.settings.compiler)) return GccTargetPath(project, builder.config);
-  return builder.LibraryDirectory() + "/" + project.name + "." + std::string(TargetTypeExtension(project.targetType));
-}
 
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   const Project& project = builder.project;
@@ -153,9 +147,9 @@ std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   std::vector<std::string> inputs;
   for (const ScannedFile* file : builder.scanned) {
     if (HasObject(file->file)) {
-      inputs.push_back(ObjectPath(builder, file->file));
+      inputs.push_back(builder.paths.Object(file->file));
     } else if (file->file.kind == FileKind::Rc && !project.libraryIsStatic && !isGcc) {
-      inputs.push_back(ResourceObjectPath(builder, file->file));
+      inputs.push_back(builder.paths.ResourceObject(file->file));
     }
   }
   if (project.targetType == TargetType::StaticLibrary) return inputs;
@@ -199,9 +193,9 @@ class LinkStep : public BuildStep {
       : m_builder(builder),
         m_target(std::move(target)),
         m_inputs(std::move(inputs)),
-        m_responseFile(builder.IntermediateDirectory() + "/linker.rsp"),
-        m_manifestFile(builder.IntermediateDirectory() + "/mt.rsp"),
-        m_batchFile(builder.IntermediateDirectory() + "/mtdep.bat") {}
+        m_responseFile(builder.paths.Intermediate() + "/linker.rsp"),
+        m_manifestFile(builder.paths.Intermediate() + "/mt.rsp"),
+        m_batchFile(builder.paths.Intermediate() + "/mtdep.bat") {}
 
   std::optional<Command> Prepare() override {
     try {
@@ -308,8 +302,8 @@ std::optional<Command> LinkStep::PrepareManifest() {
       project.targetType == TargetType::Application || project.targetType == TargetType::ConsoleApplication;
   const std::string name = project.name + (isDll ? ".dll" : isProgram ? ".exe" : ".");
   const std::string_view resource = isDll ? "2" : isProgram ? "1" : "0";
-  const std::string text = "/outputresource:\"" + m_builder.LibraryDirectory() + "/" + name + "\";#" +
-                           std::string(resource) + " /manifest \"./" + m_builder.IntermediateDirectory() + "/" + name +
+  const std::string text = "/outputresource:\"" + m_builder.paths.Library() + "/" + name + "\";#" +
+                           std::string(resource) + " /manifest \"./" + m_builder.paths.Intermediate() + "/" + name +
                            ".intermediate.manifest\"\n";
   m_commandFile.emplace(m_builder.settings.leftovers, m_manifestFile, text);
   if (m_builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
@@ -319,7 +313,7 @@ std::optional<Command> LinkStep::PrepareManifest() {
 // Leaves a mark of the last update beside the objects.
 std::optional<Command> LinkStep::PrepareMark() {
   std::string directory;
-  ReplaceChar(m_builder.IntermediateDirectory(), directory, '/', '\\');
+  ReplaceChar(m_builder.paths.Intermediate(), directory, '/', '\\');
   m_commandFile.emplace(m_builder.settings.leftovers, m_batchFile,
                         "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
   return Checked("\"" + directory + "\\mtdep.bat\"");

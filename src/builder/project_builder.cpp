@@ -16,72 +16,6 @@
 
 namespace qrex {
 
-std::string TranslationDirectory(const ProjectConfig& config) {
-  return "qrexsource/" + config.platform + "/" + config.name;
-}
-
-std::string DependencyFilePath(const Project& project, const ProjectConfig& config) {
-  return TranslationDirectory(config) + "/" + project.name + ".qrexdep";
-}
-
-ProjectBuilder::ProjectBuilder(ConfigSettings& settings, Project& project, ProjectConfig& config)
-    : settings(settings),
-      project(project),
-      config(config),
-      m_translationDirectory(TranslationDirectory(config)),
-      m_intermediateDirectory(config.platform + "/" + config.name + "/" + project.name) {}
-
-ProjectBuilder::~ProjectBuilder() = default;
-
-ScannedFile& ProjectBuilder::GetScannedFile(ProjectFile& file) {
-  std::unique_ptr<ScannedFile>& slot = scannedByPath[file.path];
-  if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
-  return *slot;
-}
-
-std::vector<const ScannedFile*> ProjectBuilder::FilesOfProject() const {
-  std::vector<const ScannedFile*> files;
-  for (const auto& [path, file] : scannedByPath) {
-    if (file->file.project == &project) files.push_back(file.get());
-  }
-  std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
-  return files;
-}
-
-bool ProjectBuilder::RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) {
-  const auto [entry, isNew] = m_guidOwners.emplace(id, owner);
-  if (!isNew) existingOwner = entry->second;
-  return isNew;
-}
-
-const ScannedFile* ProjectBuilder::FileOfPosition(const char* position) const {
-  const auto holds = [position](const ScannedFile& file) {
-    return file.translated && TextRange(std::string_view(file.sourceText)).Contains(position);
-  };
-  if (m_lastPositioned && holds(*m_lastPositioned)) return m_lastPositioned;  // messages come in runs
-  for (const auto& [name, file] : scannedByPath) {
-    if (holds(*file)) return m_lastPositioned = file.get();
-  }
-  return nullptr;
-}
-
-bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
-  const ScannedFile* const file = position ? FileOfPosition(position) : nullptr;
-  if (!file) return false;
-  path = file->SourcePath();
-  const auto table = m_lineStarts.try_emplace(file, TextRange(std::string_view(file->sourceText))).first;
-  line = table->second.LineOf(position);
-  return true;
-}
-
-std::string ProjectBuilder::TranslatedPath(const ProjectFile& file) const {
-  return PathJoin(m_translationDirectory, file.path);
-}
-
-std::string ProjectBuilder::LibraryDirectory() const {
-  return PathJoin3(settings.exportLib, config.platform, config.name);
-}
-
 void ProjectBuilder::WriteHeading(std::string_view end) const {
   TraceWriter() << "\n------------------------------------- " << project.name << "  [" << config.name << "|"
                 << config.platform << "] ------------------------------------------" << end;
@@ -118,39 +52,39 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   } else if (!LoadDependencyFile(*this, dependencyFile) && settings.diagnostics) {
     TraceWriter() << "No dependency file " << dependencyFile << "\n";
   }
-  if (!settings.translateOnly) CreateDirectories(IntermediateDirectory(), true);
+  if (!settings.translateOnly) CreateDirectories(paths.Intermediate(), true);
   const size_t knownFiles = FileCount();
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (dependencyFileLoaded) ReadTimes();
   for (ScannedFile* file : scanned) {
     file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
     if (!file->needsWriting) continue;
-    hasStaleFiles = true;
+    m_hasStaleFiles = true;
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
-  if (dependencyFileLoaded && hasStaleFiles) FindTailHolders(*this, knownFiles);
+  if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, knownFiles);
 }
 
 // What the steps of an unchanged project ask for, at once: many files are waited for together.
 void ProjectBuilder::ReadTimes() {
-  std::vector<std::string> paths;
-  paths.reserve(3 * scanned.size());
+  std::vector<std::string> asked;
+  asked.reserve(3 * scanned.size());
   for (const ScannedFile* file : scanned) {
-    paths.push_back(file->SourcePath());
-    paths.push_back(TranslatedPath(*file));
+    asked.push_back(file->SourcePath());
+    asked.push_back(paths.Translated(file->file));
   }
   if (RunsTools()) {
     for (const ScannedFile* file : scanned) {
-      if (HasObject(file->file)) paths.push_back(ObjectPath(*this, file->file));
+      if (HasObject(file->file)) asked.push_back(paths.Object(file->file));
     }
   }
-  const std::vector<int64_t> found = LastWriteTimes(paths);
+  const std::vector<int64_t> found = LastWriteTimes(asked);
   size_t at = 0;
   for (ScannedFile* file : scanned) {
     file->sourceTime = found[at++];
     file->targetTime = found[at++];
   }
-  for (; at < paths.size(); ++at) m_objects.try_emplace(std::move(paths[at]), Object{found[at]});
+  for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
 }
 
 void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
@@ -159,7 +93,7 @@ void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
   if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
-  if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.translated) {
+  if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.translated) {
     file.needsWriting = TailsMoved(file);
   }
   if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
@@ -180,13 +114,13 @@ void ProjectBuilder::LearnNames(ScannedFile& file) {
 }
 
 void ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
-  const int64_t resourceTime = LastWriteTime(ResourceObjectPath(*this, file.file));
+  const int64_t resourceTime = LastWriteTime(paths.ResourceObject(file.file));
   if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return;
   scheduler.Add(ResourceStep(*this, file), [this](bool succeeded) { m_hasFailed = m_hasFailed || !succeeded; });
 }
 
 void ProjectBuilder::CompileIfStale(ScannedFile& file) {
-  const std::string path = ObjectPath(*this, file.file);
+  const std::string path = paths.Object(file.file);
   const auto [known, isNew] = m_objects.try_emplace(path);
   Object& object = known->second;
   if (!object.source) object.source = &file.file;
@@ -194,12 +128,11 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   if (isNew) object.time = times.LastWriteTime(path);
   if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
   BringUpToDate(file);
-  scheduler.Add(file.file.kind == FileKind::Asm ? AssembleStep(*this, file) : CompileStep(*this, file),
-                [this, path, &object](bool succeeded) {
-                  m_hasFailed = m_hasFailed || !succeeded;
-                  object.time = times.LastWriteTime(path);
-                  settings.made.insert(path);
-                });
+  scheduler.Add(ObjectStep(*this, file), [this, path, &object](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    object.time = times.LastWriteTime(path);
+    settings.made.insert(path);
+  });
 }
 
 // One of them would take the other's place in the target.
@@ -234,7 +167,7 @@ void ProjectBuilder::ReportUnregistered() const {
 
 void ProjectBuilder::LinkIfStale() {
   if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return;  // no target
-  const std::string target = TargetPath(*this);
+  const std::string target = paths.Target();
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
   auto timeOf = [&](const std::string& input) {
@@ -262,7 +195,7 @@ void ProjectBuilder::Save(const std::string& dependencyFile) {
       if (file->file.isMainSource && (!file->translated || file->needsWriting)) file->translationTime = 0;
     }
   }
-  if (hasStaleFiles) ForgetUnsettledTails(*this);
+  if (m_hasStaleFiles) ForgetUnsettledTails(*this);
   SaveDependencyFile(*this, dependencyFile);
 }
 
@@ -273,7 +206,7 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
     if (!DeleteReporting(path)) ++errorCount;
   };
   remove(dependencyFile);
-  for (const ProjectFile* file : project.files) remove(TranslatedPath(*file));
+  for (const ProjectFile* file : project.files) remove(paths.Translated(*file));
 }
 
 namespace {

@@ -9,7 +9,7 @@ namespace {
 // Goes through the files as a build that translates them all, and deals out the tails as it would.
 class TailWalk {
  public:
-  TailWalk(const ProjectBuilder& builder, size_t knownFiles)
+  TailWalk(const BuildFiles& builder, size_t knownFiles)
       : m_builder(builder), m_knownFiles(knownFiles), m_visited(builder.FileCount()), m_holders(builder.FileCount()) {
     for (ScannedFile* file : builder.scanned) Visit(*file);
   }
@@ -38,7 +38,7 @@ class TailWalk {
     return found != m_builder.scannedByPath.end() && found->second->index < m_knownFiles;
   }
 
-  const ProjectBuilder& m_builder;
+  const BuildFiles& m_builder;
   const size_t m_knownFiles;
   std::vector<bool> m_visited;
   std::vector<ScannedFile*> m_holders;
@@ -54,7 +54,7 @@ bool HasTail(ScannedFile& header) {
 
 }  // namespace
 
-void FindTailHolders(ProjectBuilder& builder, size_t knownFiles) {
+void FindTailHolders(BuildFiles& builder, size_t knownFiles) {
   const TailWalk walk(builder, knownFiles);
   for (const auto& [path, file] : builder.scannedByPath) file->tailHolder = walk.HolderOf(*file);
 }
@@ -72,7 +72,7 @@ bool TailsMoved(ScannedFile& file) {
   return false;
 }
 
-void ForgetUnsettledTails(ProjectBuilder& builder) {
+void ForgetUnsettledTails(BuildFiles& builder) {
   const TailWalk walk(builder, builder.FileCount());
   for (const auto& [path, file] : builder.scannedByPath) {
     if (file->lostTail) file->translationTime = 0;

@@ -16,7 +16,7 @@ void RequireStack(const ScannedFile& file) {
 }  // namespace
 
 // The cache is set ahead of the imports, so that a cycle in a dependency file ends here.
-int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file) {
+int64_t LatestSourceTime(BuildFiles& builder, ScannedFile& file) {
   if (file.latestSourceTime != 0) return file.latestSourceTime;
   RequireStack(file);
   file.latestSourceTime = file.sourceTime != 0 ? file.sourceTime : builder.times.LastWriteTime(file.SourcePath());
@@ -31,14 +31,14 @@ int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file) {
 
 namespace {
 
-int64_t TargetTime(ProjectBuilder& builder, ScannedFile& file) {
-  if (file.targetTime == 0) file.targetTime = builder.times.LastWriteTime(builder.TranslatedPath(file));
+int64_t TargetTime(BuildFiles& builder, ScannedFile& file) {
+  if (file.targetTime == 0) file.targetTime = builder.times.LastWriteTime(builder.paths.Translated(file.file));
   return file.targetTime;
 }
 
 }  // namespace
 
-int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer) {
+int64_t LatestTargetTime(BuildFiles& builder, ScannedFile& file, const ScannedFile* importer) {
   if (file.latestTargetTime != 0) return file.latestTargetTime;
   RequireStack(file);
   file.latestTargetTime = TargetTime(builder, file);
@@ -52,11 +52,11 @@ int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const Scann
   return file.latestTargetTime;
 }
 
-bool LiesAhead(const ProjectBuilder& builder, int64_t time) {
+bool LiesAhead(const BuildFiles& builder, int64_t time) {
   return time > builder.settings.begun && time > platform::SystemFileTime();
 }
 
-bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file) {
+bool NeedsTranslation(BuildFiles& builder, ScannedFile& file) {
   if (TargetTime(builder, file) == 0) return true;
   const int64_t sourceTime = LatestSourceTime(builder, file);
   return sourceTime == 0 || sourceTime >= file.translationTime || LiesAhead(builder, file.translationTime);

@@ -34,7 +34,7 @@ struct Message {
 
 class OutputScanner {
  public:
-  explicit OutputScanner(const ProjectBuilder& builder) : m_builder(builder) {
+  explicit OutputScanner(const BuildFiles& builder) : m_builder(builder) {
     FullPathOf(".", m_currentDirectory);
     if (!m_currentDirectory.ends_with('/')) m_currentDirectory += '/';
   }
@@ -127,7 +127,7 @@ class OutputScanner {
     m_trace << indentation << path << "(" << line << ") ...\n";
   }
 
-  const ProjectBuilder& m_builder;
+  const BuildFiles& m_builder;
   std::string m_currentDirectory;  // with a slash at the end
   TraceWriter m_trace;
   ToolMessages m_found;
@@ -135,7 +135,7 @@ class OutputScanner {
 
 }  // namespace
 
-ToolMessages ScanToolOutput(const ProjectBuilder& builder, std::string_view text) {
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text) {
   return OutputScanner(builder).Scan(text);
 }
 

@@ -4,7 +4,7 @@
 #include <cstdint>
 #include <string_view>
 
-#include "builder/project_builder.h"
+#include "builder/build_files.h"
 
 namespace qrex {
 
@@ -14,6 +14,6 @@ struct ToolMessages {
 
 // Echoes the text. Two forms are recognised: `file(line) : error ...` and, of the gcc family, `file:line:column: error:
 // ...`.
-ToolMessages ScanToolOutput(const ProjectBuilder& builder, std::string_view text);
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text);
 
 }  // namespace qrex

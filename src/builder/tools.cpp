@@ -5,6 +5,7 @@
 #include <utility>
 
 #include "builder/build_step.h"
+#include "builder/source_command.h"
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/files.h"
@@ -15,115 +16,43 @@
 
 namespace qrex {
 
-std::vector<std::string> IncludePaths(const Project& project, const ProjectConfig& config, bool translated) {
-  const std::string base = translated ? TranslationDirectory(config) : project.rootDir;
-  std::vector<std::string> paths = {PathJoin(base, project.rootToProjDir), PathJoin(base, project.sourceDir)};
-  if (translated) paths.push_back(base);
-  const auto& roots = project.settings->virtualTree;
-  paths.insert(paths.end(), roots.begin(), roots.end());
-  return paths;
-}
-
-std::string CompiledDirectory(const Project& project, const ProjectConfig& config) {
-  return project.usesQrex ? TranslationDirectory(config) : project.rootDir;
-}
-
-std::string_view GccTargetExtension(TargetType type) {
-  static constexpr std::string_view kExtensions[] = {"", "a", "", "so", "???"};
-  return kExtensions[static_cast<size_t>(type)];
-}
-
-std::string GccTargetName(const Project& project) {
-  const std::string_view extension = GccTargetExtension(project.targetType);
-  std::string name = (IsLibrary(project.targetType) ? "lib" : "") + project.name;
-  if (!extension.empty()) name.append(".").append(extension);
-  return name;
-}
-
-std::string GccTargetPath(const Project& project, const ProjectConfig& config) {
-  return project.settings->exportLib + "/" + config.platform + "/" + config.name + "/" + GccTargetName(project);
-}
-
-bool HasObject(const ProjectFile& file) {
-  return file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::Asm;
-}
-
-std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
-  const bool isCompiled = file.kind != FileKind::Asm;  // the one assembler names its objects its own way
-  const std::string_view extension = isCompiled && IsGccFamily(builder.settings.compiler) ? ".o" : ".obj";
-  std::string path;
-  path.reserve(builder.IntermediateDirectory().size() + 1 + file.stem.size() + extension.size());
-  path.append(builder.IntermediateDirectory()).append("/").append(file.stem).append(extension);
-  return path;
-}
-
-std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
-  return builder.IntermediateDirectory() + "/" + file.stem + ".res";
-}
-
 namespace {
 
-std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file, const std::string& input) {
-  const std::string directory = builder.IntermediateDirectory();
-  MemoryTextWriter text;
-  auto writeIncludePaths = [&](std::string_view option) {
-    for (const std::string& path : IncludePaths(builder.project, builder.config, builder.project.usesQrex)) {
-      text << " " << option << Quoted(builder.settings, path);
-    }
-  };
-  if (IsGccFamily(builder.settings.compiler)) {
-    text << builder.config.compilerText;
-    writeIncludePaths("-I");
-    text << " -o " << QuotedInput(builder.settings, ObjectPath(builder, file));
-  } else {
-    const std::string_view prefix = CompilerOf(builder.settings.compiler).precompiledPrefix;
-    WriteCompilerSwitches(text, file, builder.config);
-    writeIncludePaths("/I ");
-    text << " /Fp\"" << directory << "/" << prefix << builder.project.name << ".pch\"";
-    text << " /Fo\"" << directory << "/\"";
-    text << " /Fd\"" << directory << "/\"";
-  }
-  text << " " << QuotedInput(builder.settings, input);
-  return text.TakeText();
-}
-
 // Where a step puts what its tool reads. Steps that may run at once must not share it.
-std::string ResponseFile(const ProjectBuilder& builder, std::string_view tool, const std::string& object) {
-  if (builder.scheduler.Overlaps()) return object + ".rsp";
-  return builder.IntermediateDirectory() + "/" + std::string(tool) + ".rsp";
+std::string ResponseFile(const ProjectBuilder& builder, const SourceCommand& command) {
+  if (builder.scheduler.Overlaps()) return command.object + ".rsp";
+  return builder.paths.Intermediate() + "/" + std::string(command.name) + ".rsp";
 }
 
 // A compiler or assembler makes an object. Its output decides; the return code matters only where it says that the tool
 // did not come to its own end and, in the gcc family, that it failed without a message of the known forms.
-class ObjectStep : public BuildStep {
+class SourceStep : public BuildStep {
  public:
-  struct Call {
-    std::string_view verb;  // told with diagnostics
-    std::string input, object;
-    std::string responseFile, text;
-    std::string command;
-    std::string hint;  // if it fails
-  };
-  ObjectStep(ProjectBuilder& builder, const ProjectFile& file, Call call)
-      : m_builder(builder), m_file(file), m_call(std::move(call)) {}
+  SourceStep(ProjectBuilder& builder, const ProjectFile& file, std::string hint)
+      : m_builder(builder),
+        m_file(file),
+        m_command(SourceCommandOf(builder.project, builder.config, file)),
+        m_responseFile(ResponseFile(builder, m_command)),
+        m_hint(std::move(hint)) {}
 
   std::optional<Command> Prepare() override {
     if (std::exchange(m_hasBegun, true)) return std::nullopt;
     const ConfigSettings& settings = m_builder.settings;
-    if (settings.diagnostics) TraceWriter() << m_call.verb << " " << m_file.path << "\n";
-    if (!ToolsTake(m_builder, {m_call.input, m_call.object})) return std::nullopt;
-    RemoveLink(m_call.object);
+    const std::string_view verb = m_file.kind == FileKind::Asm ? "Assembling " : "Compiling ";
+    if (settings.diagnostics) TraceWriter() << verb << m_file.path << "\n";
+    if (!ToolsTake(m_builder, {m_command.input, m_command.object})) return std::nullopt;
+    RemoveLink(m_command.object);
     try {
-      m_outputs.emplace(settings, std::vector{m_call.object}, std::vector{m_call.responseFile});
-      if (settings.diagnostics) TraceWriter() << m_call.responseFile << " = " << m_call.text << "\n";
-      m_response.emplace(settings.leftovers, m_call.responseFile, m_call.text);
+      m_outputs.emplace(settings, std::vector{m_command.object}, std::vector{m_responseFile});
+      if (settings.diagnostics) TraceWriter() << m_responseFile << " = " << m_command.text << "\n";
+      m_response.emplace(settings.leftovers, m_responseFile, m_command.text);
     } catch (const FileException& exception) {
       TraceWriter() << "Error: " << exception << "\n";
       m_outputs.reset();
       CountFailure();
       return std::nullopt;
     }
-    return Command{.line = m_call.command + " @\"" + m_call.responseFile + "\"",
+    return Command{.line = "cmd /c " + m_command.tool + " @\"" + m_responseFile + "\"",
                    .echo = settings.diagnostics,
                    .capturesOutput = true,
                    .errorsIntoOutput = IsGcc()};  // where that family writes its messages
@@ -131,7 +60,7 @@ class ObjectStep : public BuildStep {
 
   void Finish(const CommandResult& result) override {
     m_response.reset();
-    if (!result.succeeded) TraceWriter() << m_call.responseFile << ": " << m_call.text << "\n";
+    if (!result.succeeded) TraceWriter() << m_responseFile << ": " << m_command.text << "\n";
     const ToolMessages found = ScanToolOutput(m_builder, result.output);
     m_builder.errorCount += found.errors;
     m_builder.warningCount += found.warnings;
@@ -151,12 +80,14 @@ class ObjectStep : public BuildStep {
   bool IsGcc() const { return IsGccFamily(m_builder.settings.compiler); }
   void CountFailure(int64_t errors = 0) {
     if (errors == 0) ++m_builder.errorCount;
-    if (!m_call.hint.empty()) TraceWriter() << Hint(m_call.hint);
+    if (!m_hint.empty()) TraceWriter() << Hint(m_hint);
   }
 
   ProjectBuilder& m_builder;
   const ProjectFile& m_file;
-  const Call m_call;
+  const SourceCommand m_command;
+  const std::string m_responseFile;
+  const std::string m_hint;  // if it fails
   std::optional<ToolOutputs> m_outputs;
   std::optional<CommandFile> m_response;
   bool m_hasBegun = false;
@@ -172,7 +103,7 @@ bool IsFirstOfItsKind(const ProjectBuilder& builder, const ScannedFile& scanned)
 class ResourceObjectStep : public BuildStep {
  public:
   ResourceObjectStep(ProjectBuilder& builder, const ScannedFile& file)
-      : m_builder(builder), m_file(file), m_output(ResourceObjectPath(builder, file.file)) {}
+      : m_builder(builder), m_file(file), m_output(builder.paths.ResourceObject(file.file)) {}
 
   std::optional<Command> Prepare() override {
     if (std::exchange(m_hasBegun, true)) return std::nullopt;
@@ -210,36 +141,13 @@ class ResourceObjectStep : public BuildStep {
 
 }  // namespace
 
-std::unique_ptr<BuildStep> CompileStep(ProjectBuilder& builder, const ScannedFile& scanned) {
-  const ProjectFile& file = scanned.file;
-  const std::string object = ObjectPath(builder, file);
-  const std::string input = builder.project.usesQrex ? builder.TranslatedPath(scanned) : scanned.SourcePath();
-  return std::make_unique<ObjectStep>(
-      builder, file,
-      ObjectStep::Call{.verb = "Compiling",
-                       .input = input,
-                       .object = object,
-                       .responseFile = ResponseFile(builder, "compiler", object),
-                       .text = CompilerText(builder, file, input),
-                       .command = "cmd /c " + std::string(CompilerOf(builder.settings.compiler).compile),
-                       .hint = {}});
-}
-
-std::unique_ptr<BuildStep> AssembleStep(ProjectBuilder& builder, const ScannedFile& scanned) {
-  const std::string object = ObjectPath(builder, scanned.file), input = builder.TranslatedPath(scanned);
-  const std::string assembler = builder.config.platform == "Win64" ? "ml64" : "ml /coff";
-  const bool isHinted = IsGccFamily(builder.settings.compiler) && IsFirstOfItsKind(builder, scanned);
-  return std::make_unique<ObjectStep>(
-      builder, scanned.file,
-      ObjectStep::Call{
-          .verb = "Assembling",
-          .input = input,
-          .object = object,
-          .responseFile = ResponseFile(builder, "masm", object),
-          .text = " /Fo\"" + builder.IntermediateDirectory() + "/\" \"" + input + "\"",
-          .command = "cmd /c " + assembler + " /c /Cx /nologo",
-          .hint = isHinted ? "an .asm is given to " + assembler + "; this compiler has no assembler of its own for it"
-                           : std::string()});
+std::unique_ptr<BuildStep> ObjectStep(ProjectBuilder& builder, const ScannedFile& scanned) {
+  std::string hint;
+  if (scanned.file.kind == FileKind::Asm && IsGccFamily(builder.settings.compiler) &&
+      IsFirstOfItsKind(builder, scanned)) {
+    hint = "an .asm is given to " + AssemblerOf(builder.config) + "; this compiler has no assembler of its own for it";
+  }
+  return std::make_unique<SourceStep>(builder, scanned.file, std::move(hint));
 }
 
 std::unique_ptr<BuildStep> ResourceStep(ProjectBuilder& builder, const ScannedFile& scanned) {

@@ -366,7 +366,7 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
   ProjectBuilder builder(m_settings, project, *config);
-  DeleteReporting(builder.TranslatedPath(*file));
+  DeleteReporting(builder.paths.Translated(*file));
   if (!Guarded([&] { builder.Build(DependencyFilePath(project, *config), file); })) return false;
   TraceWriter() << "\n";
   timer.Stop();

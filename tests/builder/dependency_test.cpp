@@ -218,7 +218,7 @@ TEST_F(DependencyTest, RegisteringFiles) {
 TEST_F(DependencyTest, Paths) {
   EXPECT_EQ("qrexsource/x64/Debug", TranslationDirectory(builder->config));
   EXPECT_EQ("qrexsource/x64/Debug/app.qrexdep", DependencyFilePath(App(), builder->config));
-  EXPECT_EQ("x64/Debug/app lib/x64/Debug", builder->IntermediateDirectory() + " " + builder->LibraryDirectory());
+  EXPECT_EQ("x64/Debug/app lib/x64/Debug", builder->paths.Intermediate() + " " + builder->paths.Library());
   const guid id = MakeGuid();
   std::string owner;
   EXPECT_TRUE(builder->RegisterGuid(id, "a", owner));

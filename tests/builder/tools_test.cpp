@@ -4,9 +4,7 @@
 
 #include "builder/tools.h"
 
-#include "builder/scheduler.h"
 #include "builder/tool_output.h"
-#include "message_of.h"
 #include "text/paths.h"
 #include "translator/file/translate_file.h"
 #include "workspace/switch_blocks.h"
@@ -47,18 +45,14 @@ class ToolsTest : public WorldTest {
   ScannedFile& Source(const std::string& name) {
     return builder->GetScannedFile(*App().filesByPath.at("app/src/" + name));
   }
-  CommandResult Run(const Command& command) {
-    StartCommand(settings.tools, command);
-    return EndCommand(command, *settings.tools.WaitForAny());
-  }
   bool Make(std::unique_ptr<BuildStep> step) {
     bool made = false;
     builder->scheduler.Add(std::move(step), [&made](bool succeeded) { made = succeeded; });
     return made;
   }
-  bool Compile(const std::string& name) { return Make(CompileStep(*builder, Source(name))); }
+  bool MakeObject(const std::string& name) { return Make(ObjectStep(*builder, Source(name))); }
   bool Link(std::vector<std::string> inputs) {
-    return Make(TargetStep(*builder, TargetPath(*builder), std::move(inputs)));
+    return Make(TargetStep(*builder, builder->paths.Target(), std::move(inputs)));
   }
   // A builder of the project, with its files.
   ProjectBuilder& Builder(CompilerKind compiler) {
@@ -66,7 +60,7 @@ class ToolsTest : public WorldTest {
     StartBuild();
     App().CollectFiles();
     for (ProjectFile* file : App().files) builder->scanned.push_back(&builder->GetScannedFile(*file));
-    CreateDirectories(builder->IntermediateDirectory(), true);
+    CreateDirectories(builder->paths.Intermediate(), true);
     trace.clear();
     return *builder;
   }
@@ -74,107 +68,6 @@ class ToolsTest : public WorldTest {
  private:
   std::string m_path;
 };
-
-// --- Commands
-
-TEST_F(ToolsTest, CommandsAnswerAsTheOptionsSay) {
-  ASSERT_EQ(3, Run({.line = "cmd /c exit 3"}).ReturnCode());
-  ASSERT_EQ("", trace);
-  AddTool("both", "printf 'a\\r\\nb'\nprintf oops >&2\n");
-  Write("out1.txt", "of an earlier run");
-  CommandResult both = Run({.line = "both", .capturesOutput = true, .capturesErrors = true});
-  ASSERT_EQ("a\nb|oops|oops\n", both.output + "|" + both.errors + "|" + TakeTrace());
-  ASSERT_FALSE(FileExists("out1.txt") || FileExists("out2.txt"));
-  both = Run({.line = "both", .echo = true, .capturesOutput = true, .errorsIntoOutput = true});
-  ASSERT_EQ("a\nboops|both 1>out1.txt 2>&1\n", both.output + "|" + TakeTrace());
-  both = Run({.line = "both", .capturesOutput = true, .capturesErrors = true, .failOnErrorText = true});
-  ASSERT_FALSE(both.succeeded);
-  ASSERT_EQ("both 1>out1.txt 2>out2.txt\noops\n", trace);
-}
-
-TEST_F(ToolsTest, CommandsThatFail) {
-  AddTool("dies", "kill -ABRT $$\n");
-  Write("plain", "");
-  const std::pair<Command, const char*> cases[] = {
-      {{.line = "exit 7"}, "exit 7\nReturn code : 7\n"},
-      {{.line = "exit 7", .echo = true}, "exit 7\nReturn code : 7\n"},
-      {{.line = "cmd /c nosuch x 2>/dev/null"},
-       "ERROR: nosuch was not found on PATH\ncmd /c nosuch x 2>/dev/null\nReturn code : 127\n"},
-      {{.line = "dies"}, "ERROR: dies was ended by signal 6\ndies\nReturn code : 134\n"},
-      {{.line = "./plain 2>/dev/null"}, "ERROR: ./plain cannot be executed\n./plain 2>/dev/null\nReturn code : 126\n"},
-  };
-  for (auto [command, expected] : cases) {
-    command.failOnNonZero = true;
-    EXPECT_FALSE(Run(command).succeeded) << command.line;
-    EXPECT_EQ(expected, TakeTrace());
-  }
-}
-
-TEST_F(ToolsTest, InterruptedCommandsEndTheRun) {
-  AddTool("stopped", "kill -INT $$\n");
-  ASSERT_EQ("Interrupted while running stopped",
-            MessageOf([&] { Run({.line = "cmd /c stopped x", .capturesOutput = true}); }));
-}
-
-// --- Steps
-
-// What a step is told and tells, in order: one of several commands, each of which ends with its status.
-class NotedStep : public BuildStep {
- public:
-  NotedStep(std::string& notes, char name, std::vector<std::string> lines)
-      : m_notes(notes), m_name(name), m_lines(std::move(lines)) {}
-  std::optional<Command> Prepare() override {
-    if (m_next == m_lines.size()) return std::nullopt;
-    m_notes.append(1, m_name).append("+ ");
-    return Command{.line = m_lines[m_next++]};
-  }
-  void Finish(const CommandResult& result) override {
-    m_notes.append(1, m_name).append(std::to_string(result.ReturnCode())).append(" ");
-    m_hasSucceeded = result.ReturnCode() == 0;
-  }
-
- private:
-  std::string& m_notes;
-  const char m_name;
-  const std::vector<std::string> m_lines;
-  size_t m_next = 0;
-};
-
-TEST_F(ToolsTest, StepsAreFinishedInTheirOrder) {
-  // The first ends last, once the third has begun.
-  AddTool("await", "while [ ! -e c ]; do sleep 0.01; done; exit 3\n");
-  const std::pair<size_t, const char*> cases[] = {{1, "a+ a0 a! b+ b5 b? c+ c0 c+ c0 c! "},
-                                                  {3, "a+ b+ c+ a3 a? b5 b? c0 c+ c0 c! "}};
-  for (const auto& [slots, expected] : cases) {
-    DeleteFile("c");
-    std::string notes;
-    Scheduler scheduler(settings.tools, slots);
-    auto add = [&](char name, std::vector<std::string> lines) {
-      scheduler.Add(std::make_unique<NotedStep>(notes, name, std::move(lines)),
-                    [&notes, name](bool succeeded) { notes.append(1, name).append(succeeded ? "! " : "? "); });
-    };
-    add('a', {slots == 1 ? "true" : "await"});
-    add('b', {"exit 5"});
-    add('c', {"touch c", "true"});
-    scheduler.WaitForAll();
-    EXPECT_EQ(expected, notes);
-  }
-}
-
-TEST_F(ToolsTest, AnInterruptEndsAllSteps) {
-  AddTool("writes", "echo half > \"$1\"; touch begun; sleep 30\n");
-  AddTool("stopped", "while [ ! -e begun ]; do sleep 0.01; done; kill -INT $$\n");
-  std::string notes;
-  Scheduler scheduler(settings.tools, 3);
-  EXPECT_EQ("Interrupted while running stopped", MessageOf([&] {
-              for (const char* line : {"stopped", "writes x", "writes y"}) {
-                scheduler.Add(std::make_unique<NotedStep>(notes, 'x', std::vector<std::string>{line}), [](bool) {});
-              }
-              scheduler.WaitForAll();
-            }));
-  EXPECT_EQ(0u, settings.tools.RunningCount());
-  EXPECT_EQ("x+ x+ x+ ", notes);
-}
 
 // --- Compilers
 
@@ -199,7 +92,7 @@ TEST_F(ToolsTest, CompilerCommandLines) {
                                                         {CompilerKind::vc14, visualText("")}};
   for (const auto& [compiler, expected] : cases) {
     Builder(compiler);
-    ASSERT_TRUE(Compile("x.cpp"));
+    ASSERT_TRUE(MakeObject("x.cpp"));
     ASSERT_EQ("", trace);
     ASSERT_EQ(expected, TakeLog());
     ASSERT_FALSE(FileExists("x64/Debug/app/compiler.rsp"));
@@ -207,7 +100,7 @@ TEST_F(ToolsTest, CompilerCommandLines) {
   app.usesQrex = false;
   settings.diagnostics = true;
   Builder(CompilerKind::clang);
-  Compile("x.cpp");
+  MakeObject("x.cpp");
   ASSERT_EQ(
       "Compiling app/src/x.cpp\nx64/Debug/app/compiler.rsp =  -g -DA=\"b c\" -I\"tree/app\" -I\"tree/app/src\""
       " -I\"tree\" -o \"x64/Debug/app/x.o\" \"tree/app/src/x.cpp\"\n"
@@ -219,7 +112,7 @@ TEST_F(ToolsTest, AssemblersAndResources) {
   Project& app = AddApp("Application", "\"x.asm\" \"r.rc\"");
   app.configs.front()->resourceOptions = {{"PreprocessorDefinitions", "A"}, {"ShowProgress", "true"}};
   Builder(CompilerKind::vc9);
-  ASSERT_TRUE(Make(AssembleStep(*builder, Source("x.asm"))));
+  ASSERT_TRUE(MakeObject("x.asm"));
   ASSERT_EQ(
       "ml /coff /c /Cx /nologo @x64/Debug/app/masm.rsp\n /Fo\"x64/Debug/app/\" "
       "\"qrexsource/x64/Debug/app/src/x.asm\"\n",
@@ -240,7 +133,7 @@ TEST_F(ToolsTest, AssemblersAndResources) {
   TakeLog();
   app.configs.front()->platform = "Win64";
   Builder(CompilerKind::vc9);
-  ASSERT_TRUE(Make(AssembleStep(*builder, Source("x.asm"))));
+  ASSERT_TRUE(MakeObject("x.asm"));
   ASSERT_TRUE(TakeLog().starts_with("ml64 /c /Cx /nologo @Win64/Debug/app/masm.rsp\n"));
   ASSERT_TRUE(
       trace.starts_with("Assembling app/src/x.asm\nWin64/Debug/app/masm.rsp =  /Fo\"Win64/Debug/app/\" "
@@ -276,10 +169,10 @@ TEST_F(ToolsTest, HostileNames) {
       StemOf(test.name, scanned->file.stem);
     }
     ScannedFile &resource = *builder->scanned[0], &source = *builder->scanned[1], &assembled = *builder->scanned[2];
-    if (Make(CompileStep(*builder, source))) {
+    if (Make(ObjectStep(*builder, source))) {
       EXPECT_NE(std::string::npos, TakeLog().find(test.said));
     } else {
-      EXPECT_FALSE(Make(AssembleStep(*builder, assembled)) || Make(ResourceStep(*builder, resource)));
+      EXPECT_FALSE(Make(ObjectStep(*builder, assembled)) || Make(ResourceStep(*builder, resource)));
       EXPECT_EQ(3, builder->errorCount);
       EXPECT_NE(std::string::npos, trace.find(test.said)) << trace;
       EXPECT_EQ("", TakeLog());
@@ -315,14 +208,29 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
     Builder(test.compiler);
     Write("say", test.output);
     Write("status", test.status);
-    const std::string object = ObjectPath(*builder, Source("x.cpp").file);
+    const std::string object = builder->paths.Object(Source("x.cpp").file);
     Write(object, "object");
-    EXPECT_EQ(test.succeeds, Compile("x.cpp"));
+    EXPECT_EQ(test.succeeds, MakeObject("x.cpp"));
     EXPECT_EQ(test.errors, builder->errorCount);
     EXPECT_EQ(test.warnings, builder->warningCount);
     EXPECT_EQ(test.keepsObject, FileExists(object));
     EXPECT_NE(std::string::npos, trace.find(test.output));
   }
+}
+
+// One would take the other's place in the target.
+TEST_F(ToolsTest, OneObjectOfTwoSources) {
+  AddProject("app", "Application", "qrex { \"one\" { \"same.cpp\" } \"two\" { \"same.cpp\" } }");
+  Write("tree/app/one/same.cpp", "int a;\n");
+  Write("tree/app/two/same.cpp", "int b;\n");
+  settings.translateOnly = false;
+  StartBuild();
+  EXPECT_FALSE(builder->Build("app.qrexdep", nullptr));
+  EXPECT_EQ(1, builder->errorCount);
+  const std::string expected =
+      "ERROR: No object can be made of app/two/same.cpp : x64/Debug/app/same.o is that of app/one/same.cpp\n";
+  EXPECT_NE(std::string::npos, trace.find(expected)) << trace;
+  EXPECT_EQ(std::string::npos, trace.find("Linking"));
 }
 
 // --- Output
@@ -436,7 +344,7 @@ TEST_F(ToolsTest, VisualLinks) {
   app.configs.front()->linkerText = " /DLL x.obj \"$(Platform).lib\" /OUT:\"o $(Platform)/$(Configuration).dll\" /ltcg";
   app.configs.front()->generalOptions["WholeProgramOptimization"] = "1";
   Builder(CompilerKind::vc14);
-  ASSERT_EQ("lib/x64/Debug/app.dll", TargetPath(*builder));
+  ASSERT_EQ("lib/x64/Debug/app.dll", builder->paths.Target());
   ASSERT_TRUE(Link(CollectLinkInputs(*builder)));
   ASSERT_EQ(
       "link.exe @x64/Debug/app/linker.rsp\n /DLL /OUT:\"o x64/Debug.dll\" /ltcg \"x64/Debug/app/b.obj\""
