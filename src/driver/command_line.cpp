@@ -157,7 +157,7 @@ int RunInit(const std::vector<std::string>& arguments) {
     return 1;
   }
   const std::string folder = NormalisePath(arguments.back());
-  return InitWorkspace(arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
+  return InitWorkspace(arguments[0], arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
 }
 
 }  // namespace
