@@ -25,6 +25,11 @@ INCLUDE("x64") = { "/usr/include" }
 LIB("x64") = { "/usr/lib" }
 """
 
+# Compilers that keep what they made, where they are installed: no script compiles what another one has compiled.
+CACHE = "/usr/lib/ccache"
+if os.path.isdir(CACHE):
+    os.environ.update(PATH=f"{CACHE}:{os.environ['PATH']}", CCACHE_BASEDIR=tempfile.gettempdir(), CCACHE_NOHASHDIR="1")
+
 # The words of `compiler`, in their order.
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 

@@ -1,14 +1,13 @@
+// Objects: their interfaces, attributes, nodes and metadata.
 @import "Vesk/vxObject/IObject.h"
 
 $warning(disable: 1009)
 
-namespace attributes
-{
+namespace attributes {
 
 $model+ Size { int32 width; };
 $enum+ Colour { red, green };
-$interface+ IThing : vesk::IObject
-{
+$interface+ IThing : vesk::IObject {
     string8 name;
     const string8 title;
     int32 numbers[];
@@ -24,8 +23,7 @@ $interface+ IThing : vesk::IObject
     Colour colour;
 };
 
-$class+ Thing isa IThing
-{
+$class+ Thing isa IThing {
 public:
     vesk::string8 Getname() const { return name; }
     void Setname(const vesk::string8& v) { name = v; }
@@ -64,6 +62,49 @@ private:
     vesk::xvector<vesk::int32> whole;
     vesk::int32 plain = 0;
     Colour colour = red;
+};
+
+}
+
+namespace ipc {
+
+$interface+ ipc ICounter : vesk::IObject {
+    void Add([in] int32 n);
+    void Get([out] int32& n);
+    void Name([in] const string8& name, [inout] string8& full);
+};
+$interface ipc IPlain { void Ping(); };
+
+$class+ Counter isa ICounter {
+public:
+    void Add(int32 n) { total += n; }
+    void Get(int32& n) { n = total; }
+    void Name(vesk::string8 const& name, vesk::string8& full) { full += name; }
+    int32 total = 0;
+};
+
+}
+
+namespace metadata {
+
+$class+ Shows isa vesk::IObject {
+public:
+    $int32 a : [ "field" ];
+    $int32 Add(int32 n : [ "argument" ]) const : [ "method" ] { return a + n; }
+    $void Reset() : [ "reset", 1 ] { a = 0; }
+};
+$typedef+ xvector<int32> Numbers : [ "typedef" ];
+
+}
+
+namespace short_bodies {
+
+$class+ Doubles isa vesk::IObject {
+public:
+    $indep int32 b;
+    $dep int32 a = b + 1;
+    $dep int32 twice = a * 2;
+    $cache <<async>> int32 later(int32 n) const with int32 in = b + n; { return in * 2; }
 };
 
 }

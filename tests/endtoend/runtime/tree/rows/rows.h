@@ -1,4 +1,4 @@
-// What the declarations of one header mean: a list of checks that fills itself.
+// A list of checks that fills itself.
 #pragma once
 @import "Vesk/vxObject/IObject.h"
 
@@ -9,8 +9,7 @@ inline int g_failures = 0;
 
 // As texts: numbers of different types are equal then.
 template <typename Got, typename Expected>
-void Compare(Got const& got, Expected const& expected, const char* what, const char* file, int line)
-{
+void Compare(Got const& got, Expected const& expected, const char* what, const char* file, int line) {
     ++g_checks;
     const vesk::xstring text = vxMakeString(got);
     if (text == vxMakeString(expected)) return;
@@ -19,19 +18,33 @@ void Compare(Got const& got, Expected const& expected, const char* what, const c
 }
 #define CHECK(got, expected) Compare(got, expected, #got, __FILE__, __LINE__)
 
-struct Row
-{
+struct Row {
     explicit Row(void (*check)()) : check(check), next(s_first) { s_first = this; }
     void (*check)();
     Row* next;
     static inline Row* s_first = nullptr;
 };
-#define ROW static void CheckRow(); static const Row s_row(CheckRow); static void CheckRow()
+#define ROW(name) static void Check_##name(); static const Row s_row_##name(Check_##name); static void Check_##name()
+
+inline int RunRows() {
+    for (Row const* row = Row::s_first; row; row = row->next) row->check();
+    std::printf("%d checks, %d failures\n", g_checks, g_failures);
+    return g_failures > 0;
+}
+
+template <typename Action>
+bool Throws(Action action) {
+    try {
+        action();
+    } catch (std::exception const&) {
+        return true;
+    }
+    return false;
+}
 
 // Through an archive.
 template <typename T>
-void Copy(T const& from, T& to)
-{
+void Copy(T const& from, T& to) {
     vesk::Archive ar;
     ar << from;
     vesk::InputArchive input(ar);
