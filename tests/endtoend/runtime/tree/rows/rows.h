@@ -50,3 +50,10 @@ void Copy(T const& from, T& to) {
     vesk::InputArchive input(ar);
     input >> to;
 }
+
+template <typename T>
+T Copied(T const& from) {
+    T to;
+    Copy(from, to);
+    return to;
+}

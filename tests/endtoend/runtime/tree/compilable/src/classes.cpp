@@ -47,13 +47,6 @@ ROW(nested_kinds) {
 
 namespace nested_models {
 
-template <typename T>
-static T Copied(T const& from) {
-    T to;
-    Copy(from, to);
-    return to;
-}
-
 static void CheckValues() {
     Outer::Size size;
     size.width = 3;
@@ -155,13 +148,6 @@ ROW(mixin_visits) {
 }
 
 namespace templates {
-
-template <typename T>
-static T Copied(T const& from) {
-    T to;
-    Copy(from, to);
-    return to;
-}
 
 ROW(templates) {
     Box<vesk::int32> box;
