@@ -13,7 +13,7 @@ from pathlib import Path
 
 ROOT = Path(__file__).resolve().parent.parent
 # What scripts read, and the tools that they build with.
-READ = ("docs", "examples", "runtime", "src", "templates", "README.md", "tests/endtoend", "tests/faults", "tests/generators",
+READ = ("CMakeLists.txt", "docs", "examples", "runtime", "src", "templates", "tests/endtoend", "tests/faults", "tests/generators",
         "tests/once.py")
 TOOLS = ("g++", "gcc", "cc", "ld", "ar", "make", "clang", "clang++", "lld-link", "llvm-lib", "setarch", "unshare", "python3")
 SKIPPED = 77
