@@ -47,7 +47,7 @@ class ProjectBuilder : public BuildFiles {
   bool m_hasFailed = false;                           // a step has
 };
 
-// Copies what stands outside the project's `src` folder to the export directories, translated and as it is.
+// Copies what is outside the project's `src` folder to the export directories, translated and as it is.
 void ExportPublicHeaders(Project& project, ProjectConfig& config);
 
 }  // namespace qrex

@@ -1,4 +1,4 @@
-// Compilers, assembler, resource compiler. The linker stands in link.cpp.
+// Compilers, assembler, resource compiler. The linker is in link.cpp.
 
 #include "builder/tools.h"
 

@@ -1,9 +1,6 @@
 #include "platform/interpreter.h"
 
-#include <unistd.h>
-
 #include <algorithm>
-#include <cstdlib>
 #include <string_view>
 
 #include "platform/file_system.h"
@@ -12,17 +9,6 @@
 namespace qrex::platform {
 
 namespace {
-
-bool IsOnPath(const std::string& program) {
-  const char* path = std::getenv("PATH");
-  std::string_view rest = path ? path : "";
-  while (!rest.empty()) {
-    const size_t end = std::min(rest.find(kPathListSeparator), rest.size());
-    if (access((std::string(rest.substr(0, end)) + "/" + program).c_str(), X_OK) == 0) return true;
-    rest.remove_prefix(std::min(end + 1, rest.size()));
-  }
-  return false;
-}
 
 // The batch file that marks a manifest's update is the one that this system has to carry out:
 // `@echo TEXT >"FILE"`, with %TIME% and %DATE%.
@@ -91,7 +77,7 @@ std::string WithoutInterpreter(const std::string& line) {
 std::string ForInterpreter(const std::string& line) {
   constexpr std::string_view kCompiler = "gcc-4 ";
   std::string command = WithoutInterpreter(line);
-  if (command.starts_with(kCompiler) && !IsOnPath("gcc-4")) command.erase(3, 2);
+  if (command.starts_with(kCompiler) && FindProgram("gcc-4").empty()) command.erase(3, 2);
   return ForShell(command);
 }
 

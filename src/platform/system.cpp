@@ -77,6 +77,28 @@ std::array<uint8_t, 16> MakeUuid() {
   return bytes;
 }
 
+namespace {
+
+// The file that a name on PATH stands for; empty: none.
+std::string PathOnPath(const std::string& program) {
+  const std::string path = EnvironmentValue("PATH").value_or("");
+  std::string_view rest = path;
+  while (!rest.empty()) {
+    const size_t end = std::min(rest.find(kPathListSeparator), rest.size());
+    std::string candidate = std::string(rest.substr(0, end)) + "/" + program;
+    if (access(candidate.c_str(), X_OK) == 0) return candidate;
+    rest.remove_prefix(std::min(end + 1, rest.size()));
+  }
+  return {};
+}
+
+}  // namespace
+
+std::optional<std::string> EnvironmentValue(const char* name) {
+  const char* const value = std::getenv(name);
+  return value ? std::optional<std::string>(value) : std::nullopt;
+}
+
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
 
 WorkingFolder::WorkingFolder() : m_descriptor(open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
@@ -87,10 +109,17 @@ WorkingFolder::~WorkingFolder() {
 
 void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(m_descriptor); }
 
-std::string ProgramPath() {
+std::string FindProgram(const std::string& calledAs) {
+  const bool isPath = calledAs.find('/') != std::string::npos;
+  std::string path;
+  return RealPath(isPath ? calledAs : PathOnPath(calledAs), path) ? path : std::string();
+}
+
+std::string ProgramPath(const std::string& calledAs) {
   std::string path(PATH_MAX, '\0');
   const ssize_t length = readlink("/proc/self/exe", path.data(), path.size());
-  path.resize(length > 0 ? static_cast<size_t>(length) : 0);
+  if (length <= 0) return FindProgram(calledAs);
+  path.resize(static_cast<size_t>(length));
   return path;
 }
 
@@ -142,12 +171,12 @@ bool RunOnStack(size_t bytes, const std::function<void()>& body) {
     std::exception_ptr failure;
   } run{body, stack, nullptr};
   const auto start = [](void* argument) -> void* {
-    Run& run = *static_cast<Run*>(argument);
-    stackBegin = reinterpret_cast<uintptr_t>(run.stack) + kGuard;
+    Run& self = *static_cast<Run*>(argument);
+    stackBegin = reinterpret_cast<uintptr_t>(self.stack) + kGuard;
     try {
-      run.body();
+      self.body();
     } catch (...) {
-      run.failure = std::current_exception();
+      self.failure = std::current_exception();
     }
     return nullptr;
   };
@@ -169,7 +198,7 @@ bool IsStackShort() {
 
 void SetSignals() {
   std::signal(SIGXFSZ, [](int) {});  // a handler, since tools would inherit that the signal is ignored
-  std::signal(SIGCHLD, SIG_DFL);     // who ignores it, also by inheritance, is not told how its tools ended
+  std::signal(SIGCHLD, SIG_DFL);     // who ignores it, also by inheritance, does not learn how its tools ended
 }
 
 // The heap begins with a step that holds most runs, in large pages: to be given memory page by page took up to half of

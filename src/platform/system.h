@@ -4,6 +4,7 @@
 #include <array>
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <string>
 
 namespace qrex::platform {
@@ -14,6 +15,7 @@ uint64_t PerformanceFrequency();  // counts per second
 
 std::array<uint8_t, 16> MakeUuid();  // random, in network byte order
 
+std::optional<std::string> EnvironmentValue(const char* name);
 void SetEnvironment(const std::string& name, const std::string& value);
 constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
 
@@ -30,7 +32,10 @@ class WorkingFolder {
   const int m_descriptor;
 };
 
-std::string ProgramPath();  // of this program, with symbolic links resolved; empty where the system does not tell
+// Of this program, with symbolic links resolved. Where the system does not tell, it is found by the first word of its
+// command line: a path, or a name on PATH; empty: not found.
+std::string ProgramPath(const std::string& calledAs);
+std::string FindProgram(const std::string& calledAs);  // by that word alone
 uint64_t CurrentThreadId();
 bool IsProcessRunning(uint64_t id);
 struct LocalTime {
@@ -44,7 +49,7 @@ bool RunOnStack(size_t bytes, const std::function<void()>& body);
 // Whether that stack may not hold another level of what is nested. What recurses as deep as its input asks here.
 bool IsStackShort();
 // From now on a write beyond the user's limit of file sizes fails, where it would end the process, and the ends of
-// tools are told.
+// tools are reported to it.
 void SetSignals();
 void TuneHeap();  // for a short run that fills much memory: take it in large steps
 

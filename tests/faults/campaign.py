@@ -216,7 +216,7 @@ def full_disk(kind, folder, kib):
         done = run(kind.binary, mount / "w", kind.arguments)
         shutil.copytree(mount / "w", folder / "w", symlinks=True)
     finally:
-        subprocess.run(["umount", mount], check=True)
+        subprocess.run(["umount", "--lazy", mount], check=True)  # a thread that forks has our files open for a moment
     try:
         kind.check(folder / "w", done)
     except Violation as violation:

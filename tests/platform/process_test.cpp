@@ -180,6 +180,9 @@ TEST_F(ProcessTest, CompilerOfTheGccFamily) {
   EXPECT_EQ(7, Code("cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
   std::filesystem::rename("bin/gcc", "bin/gcc-4");
   EXPECT_EQ(7, Code("gcc-4 x"));
+  EXPECT_EQ(FindProgram("bin/gcc-4"), FindProgram("gcc-4"));
+  EXPECT_EQ(std::filesystem::current_path() / "bin/gcc-4", FindProgram("gcc-4"));
+  EXPECT_EQ("", FindProgram("gcc-5") + FindProgram("none/gcc-4"));
   SetEnvironment("PATH", path);
 }
 

@@ -54,17 +54,13 @@ TEST_F(SystemTest, ErrorCodes) {
   const std::string path = "f";
   std::string content;
   Write(path, "x");
-  EXPECT_FALSE(ReadFile(path + "none", content));
-  EXPECT_EQ(2u, LastError());
-  EXPECT_FALSE(ReadFile(path + "/a", content));
-  EXPECT_EQ(3u, LastError());
-  EXPECT_FALSE(ReadFile(".", content));
-  EXPECT_EQ(5u, LastError());
-  EXPECT_FALSE(MakeEmptyFile(path, false));
-  EXPECT_EQ(80u, LastError());
+  EXPECT_EQ(0u, ReadFile(path, content).Code());
+  EXPECT_EQ(2u, ReadFile(path + "none", content).Code());
+  EXPECT_EQ(3u, ReadFile(path + "/a", content).Code());
+  EXPECT_EQ(5u, ReadFile(".", content).Code());
+  EXPECT_EQ(80u, MakeEmptyFile(path, false).Code());
   SetReadOnlyAttribute(path, true);
-  EXPECT_FALSE(MakeEmptyFile(path, true));  // also for the superuser
-  EXPECT_EQ(5u, LastError());
+  EXPECT_EQ(5u, MakeEmptyFile(path, true).Code());  // also for the superuser
   EXPECT_FALSE(RemoveFile(path));
   SetReadOnlyAttribute(path, false);
   EXPECT_TRUE(RemoveFile(path));

@@ -4,18 +4,15 @@
 vxDefineTarget(ipc, 1)
 void Register_Project_ipc();
 
-$interface+ ipc ICount : vesk::IObject
-{
+$interface+ ipc ICount : vesk::IObject {
     void Add([in] int32 n);
     void Get([in] int32 times, [out] int32& n, [inout] string8& text) const;
 };
 
-$class+ Count isa ICount
-{
+$class+ Count isa ICount {
 public:
     void Add(int32 n) { total += n; }
-    void Get(int32 times, int32& n, vesk::string8& text) const
-    {
+    void Get(int32 times, int32& n, vesk::string8& text) const {
         if (times < 0) throw std::invalid_argument("times");
         n = times * total;
         text += "!";
@@ -23,8 +20,7 @@ public:
     int32 total = 0;
 };
 
-int main()
-{
+int main() {
     Register_Project_ipc();
     Count count;
     vesk::LocalChannel channel;
@@ -38,17 +34,13 @@ int main()
     vesk::string8 text = "a";
     far->Get(3, n, text);
     vesk::xout() << n << ' ' << text << '\n';
-    try
-    {
+    try {
         far->Get(-1, n, text);
-    }
-    catch (vesk::RemoteError const& error)
-    {
+    } catch (vesk::RemoteError const& error) {
         vesk::xout() << "caught " << error.what() << '\n';
     }
     typedef vesk::xvector<vesk::octet_t> Bytes;
-    for (Bytes const& message : {Bytes{1, 0, 0, 5, 0}, Bytes{1, 0, 0, 5, 0, 0, 0, 9}, Bytes{1, 7, 0}})
-    {
+    for (Bytes const& message : {Bytes{1, 0, 0, 5, 0}, Bytes{1, 0, 0, 5, 0, 0, 0, 9}, Bytes{1, 7, 0}}) {
         channel.Client().Send(message);
         server.Serve();
     }
