@@ -13,9 +13,10 @@ from pathlib import Path
 
 ROOT = Path(__file__).resolve().parent.parent
 # What scripts read, and the tools that they build with.
-READ = ("CMakeLists.txt", "docs", "examples", "runtime", "src", "templates", "tests/endtoend", "tests/faults", "tests/generators",
-        "tests/once.py")
-TOOLS = ("g++", "gcc", "cc", "ld", "ar", "make", "clang", "clang++", "lld-link", "llvm-lib", "setarch", "unshare", "python3")
+READ = ("CHANGELOG.md", "CMakeLists.txt", "HACKING.md", "README.md", "cmake", "docs", "examples", "runtime", "src", "templates",
+        "tests/endtoend", "tests/faults", "tests/generators", "tests/once.py")
+TOOLS = ("g++", "gcc", "cc", "ld", "ar", "make", "clang", "clang++", "lld-link", "llvm-lib", "setarch", "unshare", "python3",
+         "cmake", "cpack", "lintian", "man", "bash", "zsh")
 SKIPPED = 77
 
 
