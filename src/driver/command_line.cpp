@@ -4,8 +4,8 @@
 #include <iterator>
 
 #include "driver/config_parser.h"
-#include "driver/manual.h"
 #include "driver/init.h"
+#include "driver/manual.h"
 #include "driver/run_workspace.h"
 #include "lex/literals.h"
 #include "platform/system.h"

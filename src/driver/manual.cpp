@@ -43,7 +43,8 @@ std::vector<ManualRow> KeyRows() {
     rows.back().values = {"true", "false"};
   }
   for (const auto& key : kEnvironmentKeys) add(key.word, "(\"platform\") = { }", key.help);
-  for (const auto& key : kPathVariables) rows.push_back({"$" + Word(key.word, " = \"\""), {}, {}, std::string(key.help)});
+  for (const auto& key : kPathVariables)
+    rows.push_back({"$" + Word(key.word, " = \"\""), {}, {}, std::string(key.help)});
   for (const auto& [key, help] : {
            std::pair("$TARGET_DIR = \"\"", "instead of platform and config: their last two folders, .../x64/Debug"),
            std::pair("$COMPILE_FILE_PATH = \"\"", "the source that compile and show are about"),
@@ -127,7 +128,8 @@ std::string ManualPage() {
   }
   page +=
       ".SH DESCRIPTION\n"
-      "Translates C++ sources with declarations that begin with $ and directives that begin with @ into plain C++ with\n"
+      "Translates C++ sources with declarations that begin with $ and directives that begin with @ into plain C++ "
+      "with\n"
       "reflection, serialisation and interfaces, compiles and links what is stale, or writes the project files of\n"
       "Visual Studio, Code::Blocks, Geany and make. What it does stands in a configuration, a file whose name ends in\n"
       ".BR .qrex .\n";
@@ -139,7 +141,8 @@ std::string ManualPage() {
   }
   page +=
       ".SH EXIT STATUS\n"
-      "0, or 1 when the run could not do what it was told. Errors of compilers and linkers are counted in the last line.\n"
+      "0, or 1 when the run could not do what it was told. Errors of compilers and linkers are counted in the last "
+      "line.\n"
       ".SH ENVIRONMENT\n.TP\n.B QREX_PYTHON\n"
       "the library of Python that @python directives load; the only one that is tried.\n"
       ".SH SEE ALSO\n"
@@ -201,7 +204,8 @@ _qrex() {
   case $word in
     -*) words=')" +
          JoinedBy(" ", OptionWords()) + R"(' ;;
-)" + values + R"(    *)
+)" + values +
+         R"(    *)
       compopt -o nospace
       mapfile -t COMPREPLY < <(compgen -d -S / -- "$word"
                                compgen -f -X '!*.qrex' -- "$word"; compgen -f -X '!*.sln' -- "$word"
@@ -231,7 +235,8 @@ _Qrex() {
   options=()" +
          JoinedBy(" ", OptionWords()) + R"()
   keys=(
-)" + lines + R"(  )
+)" + lines +
+         R"(  )
   local key
   if [[ $PREFIX == -* ]]; then
     compadd -- $options

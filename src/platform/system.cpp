@@ -110,9 +110,9 @@ WorkingFolder::~WorkingFolder() {
 void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(m_descriptor); }
 
 std::string FindProgram(const std::string& calledAs) {
-  const bool isPath = calledAs.find('/') != std::string::npos;
+  const std::string found = calledAs.find('/') == std::string::npos ? PathOnPath(calledAs) : calledAs;
   std::string path;
-  return RealPath(isPath ? calledAs : PathOnPath(calledAs), path) ? path : std::string();
+  return !found.empty() && RealPath(found, path) ? path : std::string();
 }
 
 std::string ProgramPath(const std::string& calledAs) {

@@ -81,17 +81,6 @@ def test_byte_order(binary):
                         "[1,0,3,1,99]", "numbers[300]", "nested[k][300]"])
 
 
-def test_ipc(binary):
-    """Scions: results, errors, and bytes behind the arguments."""
-    workspace, root = translate(binary, "ipc.qrws", "compilableText = true")
-    with workspace:
-        for compiler in ("g++", "clang++"):
-            need(compiler)
-            link(workspace, f"{compiler} -std=c++17 -O2 -Wall -Werror", [f"{root}/ipc/src/ipc.cpp"], "ipc")
-            equal(workspace.shell("./ipc"), "12 a!\ntimes\ncaught times\nread beyond the end of an archive\n"
-                                            "bytes behind the arguments\nno such remote method\n9\n")
-
-
 def run_with_thread_sanitizer(binary, name, output):
     need("g++", "setarch")
     workspace, root = translate(binary, f"{name}.qrws")
@@ -143,4 +132,4 @@ def test_modules(binary):
         equal(workspace.shell("./host"), "Twice Twice none\n")
 
 
-run_tests([test_undefined_behaviour, test_byte_order, test_ipc, test_threads, test_sockets, test_memory, test_modules])
+run_tests([test_undefined_behaviour, test_byte_order, test_threads, test_sockets, test_memory, test_modules])

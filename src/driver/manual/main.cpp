@@ -1,25 +1,23 @@
 // Writes the manual page and the completions of shells, which a build makes to be installed: qrex_manual FOLDER
 
-#include <fstream>
-#include <iostream>
-
 #include "driver/manual.h"
+#include "text/exceptions.h"
+#include "text/files.h"
+#include "text/trace.h"
 
 int main(int argc, char** argv) {
   if (argc != 2) {
-    std::cerr << "qrex_manual FOLDER\n";
+    qrex::WriteToConsole("qrex_manual FOLDER\n");
     return 1;
   }
   const std::string folder = std::string(argv[1]) + "/";
-  const std::pair<const char*, std::string> files[] = {
-      {"Qrex.1", qrex::ManualPage()}, {"Qrex.bash", qrex::BashCompletion()}, {"_Qrex", qrex::ZshCompletion()}};
-  for (const auto& [name, text] : files) {
-    std::ofstream file(folder + name);
-    file << text;
-    if (!file.flush()) {
-      std::cerr << "Can't write " << folder << name << "\n";
-      return 1;
-    }
+  try {
+    qrex::ReplaceFile(folder + "Qrex.1", qrex::ManualPage());
+    qrex::ReplaceFile(folder + "Qrex.bash", qrex::BashCompletion());
+    qrex::ReplaceFile(folder + "_Qrex", qrex::ZshCompletion());
+  } catch (const qrex::IException& exception) {
+    qrex::WriteToConsole(qrex::ExceptionText(exception) + "\n");
+    return 1;
   }
   return 0;
 }

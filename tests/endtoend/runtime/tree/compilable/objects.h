@@ -70,7 +70,7 @@ namespace ipc {
 
 $interface+ ipc ICounter : vesk::IObject {
     void Add([in] int32 n);
-    void Get([out] int32& n);
+    void Get([in] int32 times, [out] int32& n) const;
     void Name([in] const string8& name, [inout] string8& full);
 };
 $interface ipc IPlain { void Ping(); };
@@ -78,7 +78,10 @@ $interface ipc IPlain { void Ping(); };
 $class+ Counter isa ICounter {
 public:
     void Add(int32 n) { total += n; }
-    void Get(int32& n) { n = total; }
+    void Get(int32 times, int32& n) const {
+        if (times < 0) throw std::invalid_argument("times");
+        n = times * total;
+    }
     void Name(vesk::string8 const& name, vesk::string8& full) { full += name; }
     int32 total = 0;
 };

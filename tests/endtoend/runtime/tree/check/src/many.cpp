@@ -3,7 +3,6 @@
 @import "check/src/nodes.h"
 
 #include <ctime>
-#include <thread>
 
 namespace {
 
@@ -105,35 +104,4 @@ ROW(ManyWrites) {
         CHECK(w.ofField.read(), count + 3 * count - 1);
         for (int i = 0; i < count; ++i) field.a = i;
     }), true);
-}
-
-// One graph in each thread.
-ROW(GraphThreads) {
-    vesk::xvector<int32> results(4);
-    vesk::xvector<std::thread> threads;
-    for (int32& result : results) {
-        threads.emplace_back([&result] {
-            vesk::xvector<Chained> chain = Chain(500);
-            Field field;
-            Watcher w;
-            w.field = &field;
-            vesk::xvector<Scales> all(100);
-            Sums sums;
-            int changes = 0;
-            vesk::ModelHook hook([&changes](vesk::ModelChange const&) { ++changes; });
-            for (int i = 0; i < 100; ++i) {
-                chain[0].x = i;
-                field.a = i;
-                sums.x = i;
-                all[i].one = &sums;
-                result = chain.back().depth + w.ofField + sums.b + all[i].later(i);
-                result += int32(vesk::RunAsyncCalculations());
-            }
-            vesk::EvictionQueue::Get(0).EvictDownTo(-1);
-            result += changes + int32(vesk::EvictionQueue::Get(0).Count());
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
-    for (int32 result : results) CHECK(result, results[0]);
-    CHECK(results[0], 499 + 99 + 99 + 199 + 1 + 100);
 }

@@ -39,16 +39,26 @@ ROW(ipc) {
     Counter counter;
     vesk::LocalChannel channel;
     vesk::Server server(channel.Server());
+    std::string errors;
+    server.OnError([&](std::string const& error) { errors += error + '\n'; });
     vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
     const auto stub = vesk::Import<ICounter>(client, server.Export(vesk::ptr<ICounter>(&counter)));
     const vesk::ptr<ICounter> far(stub->Interface());
     far->Add(4);
     vesk::int32 n = 0;
-    far->Get(n);
-    CHECK(n, 4);
+    far->Get(3, n);
+    CHECK(n, 12);
     vesk::string8 full = "a";
     far->Name("b", full);
     CHECK(full, "ab");
+    CHECK(Throws([&] { far->Get(-1, n); }), true);
+    typedef vesk::xvector<vesk::octet_t> Bytes;
+    for (Bytes const& message : {Bytes{1, 0, 0, 5, 0}, Bytes{1, 0, 0, 5, 0, 0, 0, 9}, Bytes{1, 7, 0}}) {
+        channel.Client().Send(message);
+        server.Serve();
+    }
+    CHECK(errors, "times\nread beyond the end of an archive\nbytes behind the arguments\nno such remote method\n");
+    CHECK(counter.total, 9);
 }
 
 }
