@@ -42,7 +42,7 @@ ScannedFile& ProjectBuilder::GetScannedFile(ProjectFile& file) {
 std::vector<const ScannedFile*> ProjectBuilder::FilesOfProject() const {
   std::vector<const ScannedFile*> files;
   for (const auto& [path, file] : scannedByPath) {
-    if (file->file.project == &project) files.push_back(file.get());
+    if (file->file.project == &project && file->place != 0) files.push_back(file.get());
   }
   std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
   return files;
@@ -56,7 +56,7 @@ bool ProjectBuilder::RegisterGuid(const guid& id, const std::string& owner, std:
 
 const ScannedFile* ProjectBuilder::FileOfPosition(const char* position) const {
   const auto holds = [position](const ScannedFile& file) {
-    return file.translated && TextRange(std::string_view(file.sourceText)).Contains(position);
+    return file.HasBegun() && TextRange(std::string_view(file.text.source)).Contains(position);
   };
   if (m_lastPositioned && holds(*m_lastPositioned)) return m_lastPositioned;  // messages come in runs
   for (const auto& [name, file] : scannedByPath) {
@@ -65,13 +65,26 @@ const ScannedFile* ProjectBuilder::FileOfPosition(const char* position) const {
   return nullptr;
 }
 
-bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
+bool ProjectBuilder::FindSourcePlace(const char* position, SourcePlace& place) const {
   const ScannedFile* const file = position ? FileOfPosition(position) : nullptr;
   if (!file) return false;
-  path = file->SourcePath();
-  const auto table = m_lineStarts.try_emplace(file, TextRange(std::string_view(file->sourceText))).first;
-  line = table->second.LineOf(position);
+  const TextRange text{std::string_view(file->text.source)};
+  const auto lines = m_lineStarts.try_emplace(file, text).first;
+  place = {file->SourcePath(), lines->second.LineOf(position), position - text.begin,
+           EndOfWord(text, position) - text.begin};
   return true;
+}
+
+void ProjectBuilder::Tell(const Message& message) {
+  if (message.severity == Severity::Warning && message.code != 0) ++warningCount;
+  settings.Tell(message);
+}
+
+void ProjectBuilder::TakenBack(ScannedFile& file) {
+  m_lineStarts.erase(&file);
+  if (m_lastPositioned == &file) m_lastPositioned = nullptr;
+  registerMap.TakeBack(file.file.path);
+  unregisterMap.TakeBack(file.file.path);
 }
 
 std::string ProjectBuilder::TranslatedPath(const ProjectFile& file) const {
@@ -146,8 +159,8 @@ void ProjectBuilder::ReadTimes() {
   const std::vector<int64_t> found = LastWriteTimes(paths);
   size_t at = 0;
   for (ScannedFile* file : scanned) {
-    file->sourceTime = found[at++];
-    file->targetTime = found[at++];
+    file->times.source = found[at++];
+    file->times.target = found[at++];
   }
   for (; at < paths.size(); ++at) m_objectTimes.emplace(std::move(paths[at]), found[at]);
 }
@@ -166,17 +179,17 @@ bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
   bool result = true;
-  if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
-  if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.translated) {
-    file.needsWriting = TailsMoved(file);
+  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file);
+  if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
+    if (TailsMoved(file)) WriteAgain(file);
   }
-  if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
-  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.translationTime == 0) LearnNames(file);
+  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten)) BringUpToDate(file);
+  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.times.translation == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
     result = CompileResourceIfStale(file);
   }
   if (RunsTools() && HasObject(file.file) && isWanted) result = CompileIfStale(file);
-  if (kind == FileKind::Cpp && !file.translated) MarkRegistered(file);
+  if (kind == FileKind::Cpp && !file.HasBegunInPass()) MarkRegistered(file);
   return result;
 }
 
@@ -222,10 +235,11 @@ std::string HowToRegister(const ScannedFile& header) {
 
 void ProjectBuilder::ReportUnregistered() const {
   for (const ScannedFile* file : scanned) {
-    if (!file->hasDeclarations || file->registered) continue;
-    TraceWriter() << file->SourcePath() << "(1) : error : No cpp directly imports " << file->file.name
-                  << " - declarations not registered\n"
-                  << Hint(HowToRegister(*file));
+    if (!file->hasDeclarations || file->tail.isRegistered) continue;
+    settings.Tell({.place = {file->SourcePath(), 1},
+                   .label = "error : ",
+                   .text = "No cpp directly imports " + file->file.name + " - declarations not registered",
+                   .hints = {HowToRegister(*file)}});
   }
 }
 
@@ -255,7 +269,7 @@ bool ProjectBuilder::LinkIfStale() {
 void ProjectBuilder::Save(const std::string& dependencyFile) {
   if (registerMap.dirty || unregisterMap.dirty) {
     for (ScannedFile* file : scanned) {
-      if (file->file.isMainSource && (!file->translated || file->needsWriting)) file->translationTime = 0;
+      if (file->file.isMainSource && (!file->HasBegun() || file->needsWriting)) file->times.translation = 0;
     }
   }
   if (hasStaleFiles) ForgetUnsettledTails(*this);

@@ -23,6 +23,10 @@ class ProjectBuilder : public TranslationHost {
   // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
   // An exception of the translation goes on to the caller; what was finished before it is kept.
   bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
+  // Behind a Build: translates again what follows from these files, whose texts have changed since, and no other. What
+  // they and all that import them had declared is taken back. A pass that ends early, by an exception, is made good by
+  // the next one.
+  void TranslateAgain(const std::vector<ProjectFile*>& changed);
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   // --- TranslationHost
@@ -38,8 +42,9 @@ class ProjectBuilder : public TranslationHost {
   size_t NextFileIndex() override { return m_nextFileIndex++; }
   size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
   std::vector<const ScannedFile*> FilesOfProject() const override;
-  void CountWarning() override { ++warningCount; }
-  bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const override;
+  void Tell(const Message& message) override;
+  void TakenBack(ScannedFile& file) override;
+  bool FindSourcePlace(const char* position, SourcePlace& place) const override;
 
   // --- Paths
   std::string TranslatedPath(const ProjectFile& file) const;
@@ -71,6 +76,9 @@ class ProjectBuilder : public TranslationHost {
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   bool ProcessFiles(const ProjectFile* singleFile);
   bool ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
+  void BeginPass(const std::vector<ProjectFile*>& changed);
+  bool RegistriesMoved();              // asked for the main source, behind all that could settle them
+  void WriteAgain(ScannedFile& file);  // though it was translated in an earlier pass
   void LearnNames(ScannedFile& file);
   bool CompileResourceIfStale(ScannedFile& file);
   bool CompileIfStale(ScannedFile& file);

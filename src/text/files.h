@@ -49,7 +49,8 @@ int64_t OnScaleOf(int64_t stamp, int64_t time);
 bool FullPathOf(const std::string& path, std::string& out);
 bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
 bool ReadWholeFile(std::string& out, const std::string& path);
-bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
+bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);
+void FoldLineEnds(std::string& text);                        // CR LF and lone CR to LF
 bool LoadStream(std::string& out, const std::string& path);  // as LoadText with folding, also from a pipe or device
 
 // Removes what killed runs left where they were writing. One for each run: it looks through each folder once.
