@@ -172,7 +172,7 @@ LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(m_world.fil
 
 LSFileFrame::~LSFileFrame() { LeaveDefinitions(); }
 
-// Not by the names of the variables: these may stand in the text of another file, which may be gone.
+// Not by the names of the variables: these may be in the text of another file, which may be gone.
 void LSFileFrame::LeaveDefinitions() {
   for (std::string_view name : m_entered) m_world.definitions.Remove(name, m_index);
 }

@@ -11,7 +11,7 @@
 namespace qrex {
 
 struct SourcePlace {
-  std::string file;  // empty: no place is known
+  std::string file = {};  // empty: no place is known
   int64_t line = -1;
   int64_t begin = -1, end = -1;  // bytes in the text of the file, with its line ends folded; -1 while unknown
 };
@@ -22,12 +22,12 @@ enum class Severity { Note, Warning, Error };
 struct Message {
   Severity severity = Severity::Error;
   int code = 0;  // the number of a warning; 0: it has none, and is not counted
-  SourcePlace place;
-  std::string label;  // how it is headed in the log, behind the place: "error : "
-  std::string text;
-  std::string element;             // the declaration that it is about, as printed; often empty
-  std::vector<std::string> hints;  // for a terminal
-  bool isApart = false;            // the log has a blank line ahead of it
+  SourcePlace place = {};
+  std::string label = {};  // how it is headed in the log, behind the place: "error : "
+  std::string text = {};
+  std::string element = {};             // the declaration that it is about, as printed; often empty
+  std::vector<std::string> hints = {};  // for a terminal
+  bool isApart = false;                 // the log has a blank line ahead of it
 };
 
 class MessageConsumer {
