@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <iterator>
+#include <set>
 
 #include "driver/config_parser.h"
 #include "driver/init.h"
@@ -54,10 +55,11 @@ bool IsAlmost(std::string_view word, std::string_view other) {
 // For what was taken for the path of a configuration, and is none.
 std::string NoConfigurationHint(const std::string& argument) {
   if (argument.starts_with("-")) {
+    std::set<std::string_view> options;
+    for (const CallForm& form : kCallForms) options.insert(form.option);
+    options.erase("");
     std::string all;
-    for (const CallForm& form : kCallForms) {
-      const std::string_view option = form.option;
-      if (option.empty()) continue;
+    for (const std::string_view option : options) {
       if (IsAlmost(argument, option)) return "did you mean " + std::string(option) + "?";
       all.append(" ").append(option);
     }

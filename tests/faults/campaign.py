@@ -18,6 +18,7 @@ import os
 import random
 import re
 import shutil
+import signal
 import subprocess
 import sys
 import tempfile
@@ -77,7 +78,7 @@ def outputs(folder):
     number = lambda match: b"ID%d" % identifiers.setdefault(match.group(0), len(identifiers))
     for path in sorted(folder.rglob("*")):
         name = str(path.relative_to(folder))
-        if not path.is_file() or name.startswith(INPUTS) or name.endswith((".rsp", "out1.txt")):
+        if not path.is_file() or name.startswith(INPUTS) or name.endswith((".rsp", "mtdep.bat", "out1.txt")):
             continue  # of a tool that is told what to do: the next run makes them anew
         content = path.read_bytes()
         if name.endswith((".qrexdep", "projects.guids", "mt.dep")):
@@ -284,6 +285,8 @@ def main():
     parser.add_argument("--short", action="store_true", help="some calls of each kind, within two minutes")
     parser.add_argument("--markdown", action="store_true", help="the table as docs/reliability.md has it")
     options = parser.parse_args()
+    for number in signals.SIGNALS[:-1]:  # what runs in the background of a shell ignores some, and so would the runs
+        signal.signal(number, signal.SIG_DFL)
     folder = Path(tempfile.mkdtemp(prefix="qrex-faults-"))
     kept = broken = 0
     if options.markdown:

@@ -57,15 +57,16 @@ def gcc():
 
 # --- The Visual C++ family, with a resource, an assembler's source and a manifest
 
+# A compiler that cannot write says so, and takes away what it began.
+WRITES = """cp "%s" "$out" && chmod u+w "$out" || { rm -f "$out"; echo "x(1) : fatal error C1085: cannot write $out"; exit 2; }
+"""
 RESPONSE = 'eval set -- $(tr -d "\\r" < "${RSP#@}" | tr ";#" "  ")\n'
 VISUAL_TOOLS = {
     "cl": 'RSP=$2\n' + RESPONSE + """while [ $# -gt 1 ]; do case "$1" in /Fo*) out=${1#/Fo};; esac; shift; done
 out=$out$(basename "$1" .cpp).obj
-""" + PAUSE + """cp "$1" "$out" && chmod u+w "$out"
-""",
+""" + PAUSE + WRITES % "$1",
     "ml64": 'for RSP; do :; done\n' + RESPONSE + """out=${1#/Fo}$(basename "$2" .asm).obj
-""" + PAUSE + """cp "$2" "$out" && chmod u+w "$out"
-""",
+""" + PAUSE + WRITES % "$2",
     "rc.exe": """for in; do case "$in" in /fo*) out=${in#/fo};; esac; done
 """ + PAUSE + """cp "$in" "$out" && chmod u+w "$out"
 """,

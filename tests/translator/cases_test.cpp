@@ -80,7 +80,7 @@ TEST_P(CasesTest, GivesWhatIsExpected) try {
   FAIL() << ExceptionText(exception);
 }
 
-INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& info) { return info.param; });
+INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& each) { return each.param; });
 
 }  // namespace
 }  // namespace qrex
