@@ -236,10 +236,10 @@ std::string HowToRegister(const ScannedFile& header) {
 void ProjectBuilder::ReportUnregistered() const {
   for (const ScannedFile* file : scanned) {
     if (!file->hasDeclarations || file->tail.isRegistered) continue;
-    settings.Tell({.place = {file->SourcePath(), 1},
-                   .label = "error : ",
-                   .text = "No cpp directly imports " + file->file.name + " - declarations not registered",
-                   .hints = {HowToRegister(*file)}});
+    settings.Tell(Message(Severity::Error,
+                          "error : ", "No cpp directly imports " + file->file.name + " - declarations not registered")
+                      .At({file->SourcePath(), 1})
+                      .WithHint(HowToRegister(*file)));
   }
 }
 

@@ -104,9 +104,8 @@ bool WorkspaceRun::LoadAll() {
 bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
   std::string fullPath;
   if (!FindInTree(m_settings, entry, m_workspace.rootDir, fullPath)) {
-    m_settings.Tell({.label = "Error: ",
-                     .text = "Couldn't open workspace file " + entry,
-                     .hints = {TriedInTree(m_settings, entry)}});
+    m_settings.Tell(Message(Severity::Error, "Error: ", "Couldn't open workspace file " + entry)
+                        .WithHint(TriedInTree(m_settings, entry)));
     return false;
   }
   CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
@@ -282,10 +281,10 @@ std::string KnownConfigs(const Project& project) {
 ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
   ProjectConfig* config = project.FindConfig(m_settings.config, m_settings.platform);
   if (!config) {
-    m_settings.Tell({.label = "Error: ",
-                     .text = "There is no configuration " + m_settings.config + "|" + m_settings.platform +
-                             " in project " + project.name,
-                     .hints = {KnownConfigs(project)}});
+    const std::string wanted = m_settings.config + "|" + m_settings.platform;
+    m_settings.Tell(
+        Message(Severity::Error, "Error: ", "There is no configuration " + wanted + " in project " + project.name)
+            .WithHint(KnownConfigs(project)));
   }
   return config;
 }
@@ -297,13 +296,12 @@ bool Guarded(const ConfigSettings& settings, Work work) {
     work();
     return true;
   } catch (const LexScannerException& exception) {
-    settings.Tell({.place = {exception.file, exception.line, exception.begin, exception.end},
-                   .label = "error : ",
-                   .text = exception.message,
-                   .hints = {exception.hint},
-                   .isApart = true});
+    settings.Tell(Message(Severity::Error, "error : ", exception.message)
+                      .At({exception.file, exception.line, exception.begin, exception.end})
+                      .WithHint(exception.hint)
+                      .Apart());
   } catch (const IException& exception) {
-    settings.Tell({.label = "Error: ", .text = ExceptionText(exception)});
+    settings.Tell(Message(Severity::Error, "Error: ", ExceptionText(exception)));
   }
   return false;
 }

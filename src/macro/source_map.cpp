@@ -135,9 +135,7 @@ bool IsAddedText(const SourceFileList& files, const char* position) {
 }
 
 Message ParseErrorOf(const SourceFileList& files, const LexScannerException& exception) {
-  Message message;
-  message.isApart = true;
-  message.text = exception.message;
+  Message message = Message(Severity::Error, {}, exception.message).Apart();
   FindSourcePlace(files, exception.position, message.place);
   if (!exception.hint.empty()) message.hints.push_back(exception.hint);
   if (const std::string_view added = AddedLine(files, exception.position); !added.empty()) {

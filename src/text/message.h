@@ -4,6 +4,7 @@
 
 #include <cstdint>
 #include <string>
+#include <utility>
 #include <vector>
 
 #include "text/text_writer.h"
@@ -11,7 +12,7 @@
 namespace qrex {
 
 struct SourcePlace {
-  std::string file = {};  // empty: no place is known
+  std::string file;  // empty: no place is known
   int64_t line = -1;
   int64_t begin = -1, end = -1;  // bytes in the text of the file, with its line ends folded; -1 while unknown
 };
@@ -20,14 +21,29 @@ struct SourcePlace {
 enum class Severity { Note, Warning, Error };
 
 struct Message {
-  Severity severity = Severity::Error;
-  int code = 0;  // the number of a warning; 0: it has none, and is not counted
-  SourcePlace place = {};
-  std::string label = {};  // how it is headed in the log, behind the place: "error : "
-  std::string text = {};
-  std::string element = {};             // the declaration that it is about, as printed; often empty
-  std::vector<std::string> hints = {};  // for a terminal
-  bool isApart = false;                 // the log has a blank line ahead of it
+  Message(Severity severity, std::string label, std::string text)
+      : severity(severity), label(std::move(label)), text(std::move(text)) {}
+  Message&& At(SourcePlace where) && {
+    place = std::move(where);
+    return std::move(*this);
+  }
+  Message&& WithHint(std::string hint) && {
+    hints.push_back(std::move(hint));
+    return std::move(*this);
+  }
+  Message&& Apart() && {
+    isApart = true;
+    return std::move(*this);
+  }
+
+  Severity severity;
+  int code = 0;       // the number of a warning; 0: it has none, and is not counted
+  std::string label;  // how it is headed in the log, behind the place: "error : "
+  std::string text;
+  SourcePlace place;
+  std::string element;             // the declaration that it is about, as printed; often empty
+  std::vector<std::string> hints;  // for a terminal
+  bool isApart = false;            // the log has a blank line ahead of it
 };
 
 class MessageConsumer {
@@ -36,8 +52,7 @@ class MessageConsumer {
   virtual void Take(const Message& message) = 0;
 };
 
-void WriteMessage(TextWriter& writer,
-                  const Message& message);  // with the line end, as the log has it
-MessageConsumer& TraceMessages();           // writes each to the trace log
+void WriteMessage(TextWriter& writer, const Message& message);  // with the line end, as the log has it
+MessageConsumer& TraceMessages();                               // writes each to the trace log
 
 }  // namespace qrex

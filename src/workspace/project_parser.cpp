@@ -17,9 +17,8 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   MpfwSourceFile& file = *made;
   if (!FindInTree(*project.settings, path, project.rootDir, project.filePath) ||
       !project.settings->macroWorld.sources->Read(file.text, project.filePath)) {
-    project.settings->Tell({.label = "Error: ",
-                            .text = "Couldn't open project file " + path,
-                            .hints = {TriedInTree(*project.settings, path)}});
+    project.settings->Tell(Message(Severity::Error, "Error: ", "Couldn't open project file " + path)
+                               .WithHint(TriedInTree(*project.settings, path)));
     return false;
   }
   file.path = project.filePath;

@@ -57,7 +57,7 @@ Project* Workspace::LoadProject(const std::string& path) {
   m_byName.emplace(project.name, &project);
   if (!isRead) return nullptr;
   if (m_loadDepth >= kMaxLoadDepth || platform::IsStackShort()) {
-    settings.Tell({.label = "Error: ", .text = "Subprojects nested too deeply at " + path});
+    settings.Tell(Message(Severity::Error, "Error: ", "Subprojects nested too deeply at " + path));
     return nullptr;
   }
   ++m_loadDepth;
@@ -218,12 +218,12 @@ bool Workspace::CheckFileReferences() {
       const auto [entry, isNew] = fileMap.emplace(file->path, file);
       if (isNew) continue;
       const Project& other = *entry->second->project;
-      settings.Tell(
-          {.label = "ERROR:  ",
-           .text = &other == project.get()
-                       ? "Project " + other.rootToProjDir + " contains duplicate reference to file " + file->path
-                       : "Projects " + other.rootToProjDir + " and " + project->rootToProjDir +
-                             " both reference file " + file->path});
+      const std::string text =
+          &other == project.get()
+              ? "Project " + other.rootToProjDir + " contains duplicate reference to file " + file->path
+              : "Projects " + other.rootToProjDir + " and " + project->rootToProjDir + " both reference file " +
+                    file->path;
+      settings.Tell(Message(Severity::Error, "ERROR:  ", text));
       return false;
     }
   }

@@ -82,7 +82,7 @@ void Importer::ReportCycle(const ScannedFile& imported) const {
   const std::vector<const ScannedFile*> chain = ImportChain(imported, m_file);
   std::string text = "Cycle detected in import directives.  Files in cycle are...\n    " + m_file.file.path;
   for (size_t i = 0; i + 1 < chain.size(); ++i) text += "\n    " + chain[i]->file.path;
-  m_file.host.Tell({.label = "ERROR: ", .text = text, .isApart = true});
+  m_file.host.Tell(Message(Severity::Error, "ERROR: ", text).Apart());
 }
 
 }  // namespace qrex

@@ -69,10 +69,8 @@ void WriteReflectionTails(ScannedFile& file, TextWriter& out) {
     wroteHeader = wroteHeader || &import->file == source.pairedHeader;
   }
   if (source.pairedHeader && !wroteHeader) {
-    file.host.Tell({.severity = Severity::Warning,
-                    .place = {file.SourcePath(), 1},
-                    .label = "warning : ",
-                    .text = "cpp file doesn't directly import header with same name"});
+    file.host.Tell(Message(Severity::Warning, "warning : ", "cpp file doesn't directly import header with same name")
+                       .At({file.SourcePath(), 1}));
   }
   WriteTail(file, out, lists);
   file.host.RegisterMap().Update(source.path, lists.registerNames);

@@ -8,7 +8,7 @@
 namespace qrex {
 
 void QrexParser::SeeDeclaration(const NameSpaceElement& element) {
-  Message message{.severity = Severity::Note, .label = "see declaration of ", .text = PrintedElement(element)};
+  Message message(Severity::Note, "see declaration of ", PrintedElement(element));
   message.element = message.text;
   file.host.FindSourcePlace(element.position, message.place);
   file.host.Tell(message);
@@ -21,10 +21,8 @@ void QrexParser::ReportWarning(Warning warning, std::string_view text, const Nam
                          : element ? element->position
                                    : stream.SourcePosition(scanner.begin);
   const int code = static_cast<int>(warning);
-  Message message{.severity = Severity::Warning,
-                  .code = code,
-                  .label = "warning W" + std::to_string(code) + " : ",
-                  .text = std::string(text)};
+  Message message(Severity::Warning, "warning W" + std::to_string(code) + " : ", std::string(text));
+  message.code = code;
   if (element) message.element = PrintedElement(*element);
   file.host.FindSourcePlace(position, message.place);
   file.host.Tell(message);
