@@ -15,11 +15,18 @@ namespace {
 constexpr int kHeaders = 5;
 constexpr int kSources = 4;  // the last one is the main source
 
+class Kept : public MessageConsumer {
+ public:
+  void Take(const Message& message) override { messages.push_back(message); }
+  std::vector<Message> messages;
+};
+
 class TranslateAgainTest : public WorldTest {
  protected:
   TranslateAgainTest() {
     std::string files;
     settings.macroWorld.sources = &m_texts;
+    settings.macroWorld.messages = &m_kept;
     for (const std::string& name : Names()) {
       files += "\"src/" + name + "\" as \"" + name + "\" ";
     }
@@ -54,6 +61,7 @@ class TranslateAgainTest : public WorldTest {
 
   std::string Declaration(size_t header, const std::vector<size_t>& imports) {
     const std::string name = NameOf(header), type = Type(imports), plus = Chance(50) ? "+ " : " ";
+    if (Chance(15)) return header < kHeaders ? "$struct X;\n" : Chance(30) ? "$enum X { x };\n" : "";
     const size_t form = Below(12);
     if (form < 7 && header < kHeaders) m_declared[header] += name;
     switch (form) {
@@ -70,7 +78,7 @@ class TranslateAgainTest : public WorldTest {
       case 5:
         return "$variant" + plus + name + " { int32 i; " + type + " o; };\n";
       case 6:
-        return "$struct" + plus + name + ";\n";
+        return "$struct" + plus + NameOf(Below(kHeaders)) + ";\n";
       case 7:
         return "@def mac" + name + "(x) = x + " + std::to_string(Below(9)) + "\n";
       case 8:
@@ -109,13 +117,19 @@ class TranslateAgainTest : public WorldTest {
     return outputs;
   }
 
+  // With the note ahead of one that tells of another declaration: which of several that is depends on their order.
   template <typename Work>
-  static std::string ErrorOf(Work work) {
+  std::string ErrorOf(Work work) {
+    m_kept.messages.clear();
     try {
       work();
       return {};
     } catch (const IException& exception) {
-      return ExceptionText(exception);
+      MemoryTextWriter text;
+      const std::string error = ExceptionText(exception);
+      if (error.find(" conflicts with ") != error.npos) WriteMessage(text, m_kept.messages.back());
+      text << error;
+      return text.TakeText();
     }
   }
 
@@ -165,6 +179,7 @@ class TranslateAgainTest : public WorldTest {
 
  protected:
   OverlaidTexts m_texts;
+  Kept m_kept;
 
  private:
   std::string m_declared[kHeaders];
@@ -177,18 +192,10 @@ TEST_F(TranslateAgainTest, IsWhatAFreshBuildWouldBe) {
   EXPECT_GT(sound, 60);
 }
 
-class Kept : public MessageConsumer {
- public:
-  void Take(const Message& message) override { messages.push_back(message); }
-  std::vector<Message> messages;
-};
-
 TEST_F(TranslateAgainTest, FromMemoryWithoutWriting) {
   for (const std::string& name : Names()) m_texts.Lay("tree/app/src/" + name, "");
   m_texts.Lay("tree/app/src/h0.h", "@def one = 1\r\n$enum+ E { a };\n");
   m_texts.Lay("tree/app/src/app.cpp", "@import \"h0.h\"\nint i = one;\n\n$enum+ E;\n");
-  Kept kept;
-  settings.macroWorld.messages = &kept;
   StartBuild();
   PagedBuffer buffer;
   PagedBufferToOutputStreamAdapter target(buffer);
@@ -197,8 +204,8 @@ TEST_F(TranslateAgainTest, FromMemoryWithoutWriting) {
   buffer.AppendTo(text);
   EXPECT_NE(text.find("#include \"h0.h\"\nint i = 1;\n"), std::string::npos) << text;
   EXPECT_FALSE(FileExists("qrexsource/x64/Debug/app/src/app.cpp") || FileExists("qrexsource/x64/Debug/app/src/h0.h"));
-  ASSERT_EQ(1u, kept.messages.size());
-  const Message& warning = kept.messages[0];
+  ASSERT_EQ(1u, m_kept.messages.size());
+  const Message& warning = m_kept.messages[0];
   EXPECT_EQ(Severity::Warning, warning.severity);
   EXPECT_EQ("1017 tree/app/src/app.cpp 4",
             std::to_string(warning.code) + " " + warning.place.file + " " + std::to_string(warning.place.line));
