@@ -1,6 +1,7 @@
 #include "driver/manual.h"
 
 #include <algorithm>
+#include <vector>
 
 #include "driver/config_keys.h"
 #include "text/numbers.h"
@@ -10,10 +11,27 @@ namespace qrex {
 
 namespace {
 
+struct ManualRow {
+  std::string key;                  // as a statement with its default
+  std::string_view word;            // what of it is typed; empty: nothing that can be completed
+  std::vector<std::string> values;  // that may be typed behind it; empty: any
+  std::string help;
+};
+struct ManualSection {
+  std::string title;
+  std::vector<ManualRow> rows;
+};
+
 constexpr char kProduct[] = "a translator and build driver for C++ with reflection";
 constexpr size_t kCallColumn = 27, kHelpColumn = 48;  // of the help texts on the console
 
 std::string Word(std::string_view word, std::string_view rest) { return std::string(word).append(rest); }
+
+std::string JoinedBy(const char* separator, const std::vector<std::string>& words) {
+  std::string text;
+  for (const std::string& word : words) text += (text.empty() ? "" : separator) + word;
+  return text;
+}
 
 std::string Call(const CallForm& form) {
   std::string call = "Qrex";
@@ -62,8 +80,6 @@ std::vector<std::string> ModeNames() {
   return names;
 }
 
-}  // namespace
-
 std::vector<ManualSection> ManualSections() {
   std::vector<ManualRow> modes;
   const RunMode usual = ConfigSettings().mode;
@@ -73,6 +89,8 @@ std::vector<ManualSection> ManualSections() {
   }
   return {{"mode = WORD", std::move(modes)}, {"Keys with their defaults; $(name) expands in every string", KeyRows()}};
 }
+
+}  // namespace
 
 std::string HelpText() {
   std::string text = Word("Qrex ", Version()) + ", " + kProduct + "\n\n";
@@ -152,7 +170,10 @@ std::string ManualPage() {
 
 std::string KeyTable() {
   std::string table = "| Key with its default | Effect |\n|---|---|\n";
-  for (const ManualRow& row : KeyRows()) {
+  std::vector<ManualRow> rows = KeyRows();
+  const std::string usual(kModes[static_cast<size_t>(ConfigSettings().mode)].word);
+  rows.insert(rows.begin(), {"mode = " + usual, {}, {}, "one of " + JoinedBy(" ", ModeNames())});
+  for (const ManualRow& row : rows) {
     std::string help = row.help;
     ReplaceAllInPlace(help, "|", "\\|");
     table += "| `" + row.key + "` | " + help + " |\n";
@@ -163,12 +184,6 @@ std::string KeyTable() {
 // --- Completions
 
 namespace {
-
-std::string JoinedBy(const char* separator, const std::vector<std::string>& words) {
-  std::string text;
-  for (const std::string& word : words) text += (text.empty() ? "" : separator) + word;
-  return text;
-}
 
 std::vector<std::string> OptionWords() {
   std::vector<std::string> words;

@@ -4,7 +4,6 @@
 
 #include <string>
 #include <string_view>
-#include <vector>
 
 namespace qrex {
 
@@ -24,18 +23,6 @@ inline constexpr CallForm kCallForms[] = {
     {"--help", "", "this text"},
     {"--version", "", "the release"},
 };
-
-struct ManualRow {
-  std::string key;                  // as a statement with its default
-  std::string_view word;            // what of it is typed; empty: nothing that can be completed
-  std::vector<std::string> values;  // that may be typed behind it; empty: any
-  std::string help;
-};
-struct ManualSection {
-  std::string title;
-  std::vector<ManualRow> rows;
-};
-std::vector<ManualSection> ManualSections();
 
 std::string HelpText();
 std::string ManualPage();  // in the man macros of troff
