@@ -18,7 +18,7 @@ ScannedFile& BuildFiles::GetScannedFile(ProjectFile& file) {
 std::vector<const ScannedFile*> BuildFiles::FilesOfProject() const {
   std::vector<const ScannedFile*> files;
   for (const auto& [path, file] : scannedByPath) {
-    if (file->file.project == &project) files.push_back(file.get());
+    if (file->file.project == &project && file->place != 0) files.push_back(file.get());
   }
   std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
   return files;
@@ -32,7 +32,7 @@ bool BuildFiles::RegisterGuid(const guid& id, const std::string& owner, std::str
 
 const ScannedFile* BuildFiles::FileOfPosition(const char* position) const {
   const auto holds = [position](const ScannedFile& file) {
-    return file.translated && TextRange(std::string_view(file.sourceText)).Contains(position);
+    return file.HasBegun() && TextRange(std::string_view(file.text.source)).Contains(position);
   };
   if (m_lastPositioned && holds(*m_lastPositioned)) return m_lastPositioned;  // messages come in runs
   for (const auto& [name, file] : scannedByPath) {
@@ -41,13 +41,26 @@ const ScannedFile* BuildFiles::FileOfPosition(const char* position) const {
   return nullptr;
 }
 
-bool BuildFiles::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
+bool BuildFiles::FindSourcePlace(const char* position, SourcePlace& place) const {
   const ScannedFile* const file = position ? FileOfPosition(position) : nullptr;
   if (!file) return false;
-  path = file->SourcePath();
-  const auto table = m_lineStarts.try_emplace(file, TextRange(std::string_view(file->sourceText))).first;
-  line = table->second.LineOf(position);
+  const TextRange text{std::string_view(file->text.source)};
+  const auto lines = m_lineStarts.try_emplace(file, text).first;
+  place = {file->SourcePath(), lines->second.LineOf(position), position - text.begin,
+           EndOfWord(text, position) - text.begin};
   return true;
+}
+
+void BuildFiles::Tell(const Message& message) {
+  if (message.severity == Severity::Warning && message.code != 0) ++warningCount;
+  settings.Tell(message);
+}
+
+void BuildFiles::TakenBack(ScannedFile& file) {
+  m_lineStarts.erase(&file);
+  if (m_lastPositioned == &file) m_lastPositioned = nullptr;
+  registerMap.TakeBack(file.file.path);
+  unregisterMap.TakeBack(file.file.path);
 }
 
 }  // namespace qrex

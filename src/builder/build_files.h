@@ -34,8 +34,9 @@ class BuildFiles : public TranslationHost {
   size_t NextFileIndex() override { return m_nextFileIndex++; }
   size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
   std::vector<const ScannedFile*> FilesOfProject() const override;
-  void CountWarning() override { ++warningCount; }
-  bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const override;
+  void Tell(const Message& message) override;
+  void TakenBack(ScannedFile& file) override;
+  bool FindSourcePlace(const char* position, SourcePlace& place) const override;
 
   ConfigSettings& settings;
   Project& project;

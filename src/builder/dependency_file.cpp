@@ -104,7 +104,7 @@ std::string DependencyPayload(const BuildFiles& builder) {
   std::string payload;
   for (const ScannedFile* file : files) {
     AppendCompactString(payload, file->file.path);
-    AppendNumber(payload, static_cast<uint64_t>(file->translationTime), 8);
+    AppendNumber(payload, static_cast<uint64_t>(file->times.translation), 8);
     AppendNumber(payload, file->imports.size(), 4);
     for (const ScannedFile* import : file->imports) AppendCompactString(payload, import->file.path);
     payload += file->hasDeclarations ? '\1' : '\0';
@@ -120,7 +120,7 @@ bool ParseDependencyPayload(BuildFiles& builder, std::string_view payload) {
   for (std::string_view path; !(path = reader.String()).empty();) {
     ScannedFile* file = FindScanned(builder, path);
     if (!file) return false;
-    file->translationTime = static_cast<int64_t>(reader.Number(8));
+    file->times.translation = static_cast<int64_t>(reader.Number(8));
     for (uint64_t count = reader.Number(4); count > 0; --count) {
       ScannedFile* import = FindScanned(builder, reader.String());
       if (!import) return false;

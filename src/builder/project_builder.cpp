@@ -81,8 +81,8 @@ void ProjectBuilder::ReadTimes() {
   const std::vector<int64_t> found = LastWriteTimes(asked);
   size_t at = 0;
   for (ScannedFile* file : scanned) {
-    file->sourceTime = found[at++];
-    file->targetTime = found[at++];
+    file->times.source = found[at++];
+    file->times.target = found[at++];
   }
   for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
 }
@@ -92,17 +92,17 @@ void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
-  if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
-  if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.translated) {
-    file.needsWriting = TailsMoved(file);
+  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file);
+  if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
+    if (TailsMoved(file)) WriteAgain(file);
   }
-  if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
-  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.translationTime == 0) LearnNames(file);
+  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten)) BringUpToDate(file);
+  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.times.translation == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
     CompileResourceIfStale(file);
   }
   if (RunsTools() && HasObject(file.file) && isWanted) CompileIfStale(file);
-  if (kind == FileKind::Cpp && !file.translated) MarkRegistered(file);
+  if (kind == FileKind::Cpp && !file.HasBegunInPass()) MarkRegistered(file);
 }
 
 // What no run has translated registers something or not: the main source, which is to be compiled alone, has to know.
@@ -158,10 +158,11 @@ std::string HowToRegister(const ScannedFile& header) {
 
 void ProjectBuilder::ReportUnregistered() const {
   for (const ScannedFile* file : scanned) {
-    if (!file->hasDeclarations || file->registered) continue;
-    TraceWriter() << file->SourcePath() << "(1) : error : No cpp directly imports " << file->file.name
-                  << " - declarations not registered\n"
-                  << Hint(HowToRegister(*file));
+    if (!file->hasDeclarations || file->tail.isRegistered) continue;
+    settings.Tell(Message(Severity::Error,
+                          "error : ", "No cpp directly imports " + file->file.name + " - declarations not registered")
+                      .At({file->SourcePath(), 1})
+                      .WithHint(HowToRegister(*file)));
   }
 }
 
@@ -192,7 +193,7 @@ void ProjectBuilder::LinkIfStale() {
 void ProjectBuilder::Save(const std::string& dependencyFile) {
   if (registerMap.dirty || unregisterMap.dirty) {
     for (ScannedFile* file : scanned) {
-      if (file->file.isMainSource && (!file->translated || file->needsWriting)) file->translationTime = 0;
+      if (file->file.isMainSource && (!file->HasBegun() || file->needsWriting)) file->times.translation = 0;
     }
   }
   if (m_hasStaleFiles) ForgetUnsettledTails(*this);

@@ -5,6 +5,7 @@
 #include <string>
 #include <string_view>
 #include <unordered_map>
+#include <vector>
 
 #include "builder/build_files.h"
 #include "builder/scheduler.h"
@@ -18,6 +19,10 @@ class ProjectBuilder : public BuildFiles {
   // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
   // An exception of the translation goes on to the caller; what was finished before it is kept.
   bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
+  // Behind a Build: translates again what follows from these files, whose texts have changed since, and no other. What
+  // they and all that import them had declared is taken back. A pass that ends early, by an exception, is made good by
+  // the next one.
+  void TranslateAgain(const std::vector<ProjectFile*>& changed);
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   int64_t errorCount = 0;
@@ -34,6 +39,9 @@ class ProjectBuilder : public BuildFiles {
   void ReadTimes();
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   void ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
+  void BeginPass(const std::vector<ProjectFile*>& changed);
+  bool RegistriesMoved();              // asked for the main source, behind all that could settle them
+  void WriteAgain(ScannedFile& file);  // though it was translated in an earlier pass
   void LearnNames(ScannedFile& file);
   void CompileResourceIfStale(ScannedFile& file);
   void CompileIfStale(ScannedFile& file);

@@ -56,18 +56,18 @@ bool HasTail(ScannedFile& header) {
 
 void FindTailHolders(BuildFiles& builder, size_t knownFiles) {
   const TailWalk walk(builder, knownFiles);
-  for (const auto& [path, file] : builder.scannedByPath) file->tailHolder = walk.HolderOf(*file);
+  for (const auto& [path, file] : builder.scannedByPath) file->tail.holder = walk.HolderOf(*file);
 }
 
 bool TailsMoved(ScannedFile& file) {
-  if (file.lostTail) return true;
+  if (file.tail.isLost) return true;
   for (ScannedFile* import : file.imports) {
     if (import->file.kind == FileKind::Cpp) continue;
-    const bool holds = import->tailHolder == &file;
-    const bool takes = !import->registered && MayHoldTail(file.file, import->file);
+    const bool holds = import->tail.holder == &file;
+    const bool takes = !import->tail.isRegistered && MayHoldTail(file.file, import->file);
     if (holds == takes) continue;
     if (HasTail(*import)) return true;
-    if (takes) import->tailHolder = &file;
+    if (takes) import->tail.holder = &file;
   }
   return false;
 }
@@ -75,12 +75,12 @@ bool TailsMoved(ScannedFile& file) {
 void ForgetUnsettledTails(BuildFiles& builder) {
   const TailWalk walk(builder, builder.FileCount());
   for (const auto& [path, file] : builder.scannedByPath) {
-    if (file->lostTail) file->translationTime = 0;
+    if (file->tail.isLost) file->times.translation = 0;
     ScannedFile* const holder = walk.HolderOf(*file);
-    const bool hasNone = file->translated && !file->HasTail();
-    if (holder == file->tailHolder || hasNone) continue;
-    if (holder) holder->translationTime = 0;
-    if (file->tailHolder) file->tailHolder->translationTime = 0;
+    const bool hasNone = file->HasBegun() && !file->HasTail();
+    if (holder == file->tail.holder || hasNone) continue;
+    if (holder) holder->times.translation = 0;
+    if (file->tail.holder) file->tail.holder->times.translation = 0;
   }
 }
 

@@ -200,8 +200,7 @@ bool LoadConfiguration(ConfigSettings& settings, const std::string& path, const 
     return true;
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);
-    TraceWriter trace;
-    ReportParseError(settings.sourceFiles, trace, exception);
+    settings.macroWorld.messages->Take(ParseErrorOf(settings.sourceFiles, exception));
     return false;
   }
 }

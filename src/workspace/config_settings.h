@@ -58,6 +58,7 @@ struct ConfigSettings {
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
 
+  void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };
 

@@ -16,8 +16,9 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   auto made = std::make_unique<MpfwSourceFile>();
   MpfwSourceFile& file = *made;
   if (!FindInTree(*project.settings, path, project.rootDir, project.filePath) ||
-      !LoadText(file.text, project.filePath, true)) {
-    TraceWriter() << "Error: Couldn't open project file " << path << "\n" << Hint(TriedInTree(*project.settings, path));
+      !project.settings->macroWorld.sources->Read(file.text, project.filePath)) {
+    project.settings->Tell(Message(Severity::Error, "Error: ", "Couldn't open project file " + path)
+                               .WithHint(TriedInTree(*project.settings, path)));
     return false;
   }
   file.path = project.filePath;
@@ -35,8 +36,7 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   } catch (LexScannerException& exception) {
     MapErrorPosition(file.map, expansion, exception);
     if (exception.hint.empty() && parser.MayLackBrace()) exception.hint = parser.BlockHint();
-    TraceWriter trace;
-    ReportParseError(project.settings->sourceFiles, trace, exception);
+    project.settings->macroWorld.messages->Take(ParseErrorOf(project.settings->sourceFiles, exception));
     project.Empty();
   }
   return !project.hasFaultyFile;
