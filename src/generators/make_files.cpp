@@ -94,9 +94,8 @@ std::string NameThatMakeReads(const Project& project, const ProjectConfig& confi
   for (const std::string& path : CommonSwitchesOf(project, config).includePaths) {
     FindNameWith(kReadInQuotes, {path}, found);
   }
-  const BuildPaths paths(project, config);
-  for (const ProjectFile* file : CompiledFiles(project))
-    FindNameWith(kRead, {paths.Compiled(*file), file->stem}, found);
+  const std::string sources = CompiledDirectory(project, config) + "/";
+  for (const ProjectFile* file : CompiledFiles(project)) FindNameWith(kRead, {sources + file->path, file->stem}, found);
   for (const std::string& path : project.subprojects) FindNameWith(kReadInQuotes, {SubprojectName(path)}, found);
   return found;
 }
@@ -110,10 +109,12 @@ std::string NameThatMakeReads(const Workspace& workspace, const ProjectConfig& c
 
 void WriteProjectMakeFile(TextWriter& out, const Project& project, const ProjectConfig& config) {
   const std::string target = GccTargetPath(project, config);
-  const BuildPaths paths(project, config);
+  // In pieces, as there are many: the paths of BuildPaths.
+  const std::string objects = BuildPaths(project, config).Intermediate() + "/";
+  const std::string sources = CompiledDirectory(project, config) + "/";
   const auto files = CompiledFiles(project);
-  auto writeObject = [&](const ProjectFile* file) { out << paths.Object(*file); };
-  auto writeSource = [&](const ProjectFile* file) { out << paths.Compiled(*file); };
+  auto writeObject = [&](const ProjectFile* file) { out << objects << file->stem << ".o"; };
+  auto writeSource = [&](const ProjectFile* file) { out << sources << file->path; };
 
   WriteHeading(out, "Project", project.rootToProjDir, config.platform, config.name);
   WriteVariables(out, project, config, target);
@@ -132,8 +133,10 @@ void WriteProjectMakeFile(TextWriter& out, const Project& project, const Project
          "-include $(OBJS:.o=.d)\n\n";
   WriteTargetRule(out, project, target);
   for (const ProjectFile* file : files) {
-    out << paths.Object(*file) << ": " << paths.Compiled(*file)
-        << (file->kind == FileKind::Cpp ? "\n\t$(CXX) -c $(CXXFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n"
+    writeObject(file);
+    out << ": ";
+    writeSource(file);
+    out << (file->kind == FileKind::Cpp ? "\n\t$(CXX) -c $(CXXFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n"
                                         : "\n\t$(CC) -c $(CFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n");
   }
   out << ".PHONY : clean\nclean:\n\trm -f " << target << " $(OBJS:.o=.d) $(OBJS)\n";
