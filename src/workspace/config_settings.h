@@ -38,6 +38,8 @@ struct ConfigSettings {
   bool diagnostics = false;
   CompilerKind compiler = CompilerKind::vc8;
   bool targetXP = false;
+  std::string platformToolset;  // of .vcxproj files, instead of the compiler's; set: projects may name theirs
+  std::string windowsSdk;       // beside it; empty: the newest
   bool translateOnly = false;
   bool rebuildAll = false;
   bool writeTokenEquivalent = true;

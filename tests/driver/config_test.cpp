@@ -44,6 +44,7 @@ TEST_F(ConfigTest, Keys) {
       "workspaces = { \"old\" } workspaces = { } workspaces += { \"w\" }\n"
       "config = \"Old\" config=\"New\" platform = ('P') systemName = \"N\" systemProcessor = \"R\"\n"
       "systemVersion = \"V\" sizeofPointer = \"8\"\n"
+      "platformToolset = \"v143\" windowsSdk = (\"10\" + '.0')\n"
       "compiler = winegcc mode = show\n"
       "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true modernCpp = "
       "true\n"
@@ -55,6 +56,7 @@ TEST_F(ConfigTest, Keys) {
   EXPECT_EQ("[w]", Joined(Got().workspaces));
   EXPECT_EQ("New P N R V 8", Got().config + " " + Got().platform + " " + Got().systemName + " " +
                                  Got().systemProcessor + " " + Got().systemVersion + " " + Got().sizeofPointer);
+  EXPECT_EQ("v143 10.0", Got().platformToolset + " " + Got().windowsSdk);
   EXPECT_EQ(CompilerKind::winegcc, Got().compiler);
   EXPECT_EQ(RunMode::Clean, Got().mode);  // a line of the command line comes last
   EXPECT_TRUE(Got().targetXP && Got().diagnostics && Got().translateOnly && Got().rebuildAll && Got().modernCpp);
