@@ -79,4 +79,7 @@ inline constexpr ModeWord kModes[] = {
     {"show", "print where the translation of $COMPILE_FILE_PATH stands"},
 };
 
+inline constexpr std::string_view kRuntimes[] = {"none", "source", "built"};  // by RuntimeChoice
+inline constexpr std::string_view kRuntimeHelp = "a root behind virtualTree: this tool's runtime, source or built";
+
 }  // namespace qrex

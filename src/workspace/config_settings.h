@@ -16,6 +16,7 @@
 namespace qrex {
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
+enum class RuntimeChoice { None, Source, Built };
 
 struct PlatformEnvironment {
   std::string PATH, INCLUDE, LIB;  // `;`-separated lists
@@ -50,6 +51,7 @@ struct ConfigSettings {
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
   bool compilableText = false;
+  RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;

@@ -3,7 +3,9 @@
 
 import os
 import pty
+import re
 import select
+import shutil
 import signal
 import subprocess
 import sys
@@ -12,11 +14,12 @@ import time
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, holds, need, run_tests  # noqa: E402
+from workspace_fixture import equal, holds, lacks, need, run_tests  # noqa: E402
 
 INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex"]
-RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h"]
+RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h", "lib/qrex/include/Vesk/vxObject/IObject.h",
+           "lib/qrex/runtime/x64/Debug/libvxObject.a", "lib/qrex/runtime/x64/Release/libvxObject.a"]
 
 
 def installed(test):
@@ -39,16 +42,63 @@ def components(prefix, work):
     equal([name for name in INSTALLED + RUNTIME if not (prefix / name).is_file()], [])
 
 
+def run(prefix, folder, *arguments, status=0):
+    done = subprocess.run(["Qrex", *arguments], cwd=folder, env={"PATH": f"{prefix}/bin:/usr/bin:/bin"}, stdin=subprocess.DEVNULL,
+                          capture_output=True, text=True)
+    equal((done.returncode, done.stderr), (status, ""))
+    return done.stdout
+
+
 @installed
 def first_workspace(prefix, work):
-    environment = {"PATH": f"{prefix}/bin:/usr/bin:/bin"}
-    for command in (["Qrex", "--init", "zoo"], ["Qrex", "zoo.qrex"]):
-        folder = work / "zoo" if command[1] == "zoo.qrex" else work
-        done = subprocess.run(command, cwd=folder, env=environment, stdin=subprocess.DEVNULL, capture_output=True, text=True)
-        equal((done.returncode, done.stderr), (0, ""))
-    programs = [path for path in (work / "zoo/out/lib").rglob("zoo_app") if path.is_file()]
-    equal(len(programs), 1)
-    equal(subprocess.run(programs, stdout=subprocess.DEVNULL).returncode, 0)
+    """Its runtime comes built, for g++, clang++ and make; and it is found when both the workspace and the tool have moved."""
+    run(prefix, work, "--init", "zoo")
+    lacks((work / "zoo/settings.inc").read_text(), str(work.parent))
+    for compiler in ("gcc", *["clang"] * bool(shutil.which("clang++"))):
+        output = run(prefix, work / "zoo", "zoo.qrex", f"compiler={compiler}", "rebuildAll=true")
+        holds(output, "[prepackaged - only processing headers]", "Completed....")
+        program, = [path for path in (work / "zoo/out/lib").rglob("zoo_app") if path.is_file()]
+        holds(subprocess.run(program, capture_output=True, text=True, check=True).stdout, "Leo had 4.5 kg, as release 1 tells\n")
+        program.unlink()
+    equal([str(path) for path in (work / "zoo/x64/Debug/vxObject").glob("*.o")], [])
+
+    tool, checkout = work / "tools", work / "checked out/here"
+    shutil.move(prefix, tool)
+    shutil.copytree(work / "zoo", checkout, ignore=shutil.ignore_patterns("x64", "out", "qrexsource", "projects.guids"))
+    shutil.rmtree(work / "zoo")
+    run(tool, checkout, "zoo.qrex", "mode=gen")
+    if shutil.which("make"):
+        subprocess.run(["make", "d"], cwd=checkout, env={"PATH": f"{tool}/bin:/usr/bin:/bin"}, check=True, stdout=subprocess.DEVNULL)
+        subprocess.run(checkout / "out/lib/x64/Debug/zoo_app", check=True, stdout=subprocess.DEVNULL)
+    output = run(tool, checkout, "zoo.qrex", "translateOnly=true", "runtime=source")
+    lacks(output, "prepackaged")
+    equal((checkout / "qrexsource/x64/Debug/Vesk/vxObject/src/graph.cpp").is_file(), True)
+    (tool / "lib/qrex/runtime/release").write_text("1.0")
+    holds(run(tool, checkout, "zoo.qrex", status=1), "ERROR:  The runtime in ", " is of release 1.0, this tool of ")
+    shutil.rmtree(tool / "lib/qrex")
+    lacks(run(tool, checkout, "zoo.qrex", "translateOnly=true"), "prepackaged")
+
+
+# What the built runtime says when it is compiled by these; nothing: that it fits.
+MODES = [("g++ -std=c++17", ""), ("g++ -std=c++20 -O2", ""), ("clang++ -std=c++17", ""),
+         ("g++ -std=c++17 -D_GLIBCXX_DEBUG", "The built runtime is not for _GLIBCXX_DEBUG: set runtime = source"),
+         ("g++ -std=c++17 -D_GLIBCXX_USE_CXX11_ABI=0", "The built runtime is for _GLIBCXX_USE_CXX11_ABI=1: set runtime = source"),
+         ("clang++ -std=c++17 -stdlib=libc++", "The built runtime is for libstdc++: set runtime = source")]
+
+
+@installed
+def what_does_not_fit_does_not_compile(prefix, work):
+    def said(command):
+        done = subprocess.run([*command.split(), "-fsyntax-only", "-x", "c++", "-I", prefix / "lib/qrex/include", "-"],
+                              input="#include <Vesk/vxObject/Platform.h>\n", capture_output=True, text=True)
+        error = re.search(r'#error "(.*?)"', done.stderr)
+        return error.group(1) if error else done.stderr
+
+    there = [(command, text) for command, text in MODES if shutil.which(command.split()[0])]
+    equal([(command, said(command)) for command, _ in there], there)
+    header = prefix / "lib/qrex/include/Vesk/vxObject/Platform.h"
+    header.write_text(re.sub("(#define VESK_VERSION) .*", r"\1 90000", header.read_text()))
+    holds(said("g++ -std=c++17"), "The built runtime is of version ")
 
 
 @installed
@@ -132,4 +182,4 @@ def zsh_completion(prefix, work):
     completions(["zsh", "-f", "-i"], f"fpath=({folder} $fpath); autoload -U compinit; compinit -u -D", work)
 
 
-run_tests([components, first_workspace, manual_page, debian_package, bash_completion, zsh_completion])
+run_tests([components, first_workspace, what_does_not_fit_does_not_compile, manual_page, debian_package, bash_completion, zsh_completion])
