@@ -42,7 +42,10 @@ def components(prefix, work):
     equal([name for name in INSTALLED + RUNTIME if not (prefix / name).is_file()], [])
 
 
-def run(prefix, folder, *arguments, status=0):
+PAGE = Path(__file__).resolve().parents[2] / "docs/install.md"
+
+
+def qrex(prefix, folder, *arguments, status=0):
     done = subprocess.run(["Qrex", *arguments], cwd=folder, env={"PATH": f"{prefix}/bin:/usr/bin:/bin"}, stdin=subprocess.DEVNULL,
                           capture_output=True, text=True)
     equal((done.returncode, done.stderr), (status, ""))
@@ -51,32 +54,42 @@ def run(prefix, folder, *arguments, status=0):
 
 @installed
 def first_workspace(prefix, work):
-    """Its runtime comes built, for g++, clang++ and make; and it is found when both the workspace and the tool have moved."""
-    run(prefix, work, "--init", "zoo")
-    lacks((work / "zoo/settings.inc").read_text(), str(work.parent))
-    for compiler in ("gcc", *["clang"] * bool(shutil.which("clang++"))):
-        output = run(prefix, work / "zoo", "zoo.qrex", f"compiler={compiler}", "rebuildAll=true")
-        holds(output, "[prepackaged - only processing headers]", "Completed....")
-        program, = [path for path in (work / "zoo/out/lib").rglob("zoo_app") if path.is_file()]
-        holds(subprocess.run(program, capture_output=True, text=True, check=True).stdout, "Leo had 4.5 kg, as release 1 tells\n")
+    """The steps of the page. The runtime comes built, for clang++ and make as well."""
+    steps = re.search(r"\n\n((?:    .*\n)*    Qrex --init zoo\n(?:    .*\n)*)", PAGE.read_text()).group(1)
+    environment = {"PATH": f"{prefix}/bin:/usr/bin:/bin"}
+    output = subprocess.run(["bash", "-ec", steps], cwd=work, env=environment, check=True, capture_output=True, text=True).stdout
+    holds(output, "[prepackaged - only processing headers]", "Completed....", "Leo had 4.5 kg, as release 1 tells\n")
+    workspace, program = work / "zoo", work / "zoo/out/lib/x64/Debug/zoo_app"
+    if shutil.which("clang++"):
         program.unlink()
-    equal([str(path) for path in (work / "zoo/x64/Debug/vxObject").glob("*.o")], [])
+        holds(qrex(prefix, workspace, "zoo.qrex", "compiler=clang", "rebuildAll=true"), "Completed....")
+        subprocess.run(program, check=True, stdout=subprocess.DEVNULL)
+    if shutil.which("make"):
+        qrex(prefix, workspace, "zoo.qrex", "mode=gen")
+        program.unlink()
+        subprocess.run(["make", "d"], cwd=workspace, env=environment, check=True, stdout=subprocess.DEVNULL)
+        subprocess.run(program, check=True, stdout=subprocess.DEVNULL)
+    equal([str(path) for path in (workspace / "x64/Debug/vxObject").glob("*.o")], [])
 
+
+@installed
+def moved(prefix, work):
+    """A workspace is translated by a tool elsewhere, and the runtime is that of this tool, built or not."""
+    qrex(prefix, work, "--init", "zoo")
+    lacks((work / "zoo/settings.inc").read_text(), str(work.parent))
     tool, checkout = work / "tools", work / "checked out/here"
     shutil.move(prefix, tool)
-    shutil.copytree(work / "zoo", checkout, ignore=shutil.ignore_patterns("x64", "out", "qrexsource", "projects.guids"))
+    shutil.copytree(work / "zoo", checkout)
     shutil.rmtree(work / "zoo")
-    run(tool, checkout, "zoo.qrex", "mode=gen")
-    if shutil.which("make"):
-        subprocess.run(["make", "d"], cwd=checkout, env={"PATH": f"{tool}/bin:/usr/bin:/bin"}, check=True, stdout=subprocess.DEVNULL)
-        subprocess.run(checkout / "out/lib/x64/Debug/zoo_app", check=True, stdout=subprocess.DEVNULL)
-    output = run(tool, checkout, "zoo.qrex", "translateOnly=true", "runtime=source")
-    lacks(output, "prepackaged")
-    equal((checkout / "qrexsource/x64/Debug/Vesk/vxObject/src/graph.cpp").is_file(), True)
+    for argument, graph in (("runtime=built", False), ("runtime=source", True), ('config="Profile"', True)):
+        status = 1 if "Profile" in argument else 0  # a configuration that neither has
+        output = qrex(tool, checkout, "zoo.qrex", "translateOnly=true", argument, status=status)
+        equal("[prepackaged" in output, not graph)
+        equal(any(checkout.glob("qrexsource/x64/*/Vesk/vxObject/src/graph.cpp")), graph)
     (tool / "lib/qrex/runtime/release").write_text("1.0")
-    holds(run(tool, checkout, "zoo.qrex", status=1), "ERROR:  The runtime in ", " is of release 1.0, this tool of ")
+    holds(qrex(tool, checkout, "zoo.qrex", status=1), "ERROR:  The runtime in ", " is of release 1.0, this tool of ")
     shutil.rmtree(tool / "lib/qrex")
-    lacks(run(tool, checkout, "zoo.qrex", "translateOnly=true"), "prepackaged")
+    lacks(qrex(tool, checkout, "zoo.qrex", "translateOnly=true"), "[prepackaged")
 
 
 # What the built runtime says when it is compiled by these; nothing: that it fits.
@@ -94,7 +107,9 @@ def what_does_not_fit_does_not_compile(prefix, work):
         error = re.search(r'#error "(.*?)"', done.stderr)
         return error.group(1) if error else done.stderr
 
-    there = [(command, text) for command, text in MODES if shutil.which(command.split()[0])]
+    there = [(command, text) for command, text in MODES
+             if subprocess.run([*command.split(), "-fsyntax-only", "-x", "c++", "-include", "set", "/dev/null"],
+                               capture_output=True).returncode == 0]
     equal([(command, said(command)) for command, _ in there], there)
     header = prefix / "lib/qrex/include/Vesk/vxObject/Platform.h"
     header.write_text(re.sub("(#define VESK_VERSION) .*", r"\1 90000", header.read_text()))
@@ -182,4 +197,4 @@ def zsh_completion(prefix, work):
     completions(["zsh", "-f", "-i"], f"fpath=({folder} $fpath); autoload -U compinit; compinit -u -D", work)
 
 
-run_tests([components, first_workspace, what_does_not_fit_does_not_compile, manual_page, debian_package, bash_completion, zsh_completion])
+run_tests([components, first_workspace, moved, what_does_not_fit_does_not_compile, manual_page, debian_package, bash_completion, zsh_completion])
