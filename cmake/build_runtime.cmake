@@ -1,10 +1,11 @@
 # The runtime as it is installed: built by the tool itself and described, by the tool as well, as a project that comes built.
-#   STEP      prepare; Debug, Release: the configuration to build; gather
-#   SOURCE    the checkout
-#   FOLDER    where it is built. What is to be installed comes to stand in FOLDER/runtime, a root for virtualTree, and
-#             FOLDER/include, its headers as they are translated.
-#   QREX, RELEASE, COMPILER, CXX, STRIP    the program and its release; the compiler's word in configurations, and its command;
-#             what takes debug information out of a library
+# Included with
+#   STEP                   prepare; Debug, Release: the configuration to build; gather
+#   SOURCE                 the checkout
+#   FOLDER                 where it is built. What is to be installed comes to stand in FOLDER/runtime, a root for virtualTree,
+#                          and FOLDER/include, its headers as they are translated.
+#   QREX, RELEASE          the program and its release
+#   COMPILER, CXX, STRIP   the compiler's word in configurations, its command; what takes debug information out of a library
 set(tree ${FOLDER}/tree)
 set(platform_header Vesk/vxObject/Platform.h)
 
@@ -19,23 +20,44 @@ endfunction()
 # The sources, with the header that checks in front of those that need it: in place of the blank line behind the version.
 function(prepare)
   file(REMOVE_RECURSE ${tree})
-  file(COPY ${SOURCE}/runtime/ DESTINATION ${tree} PATTERN Platform.h EXCLUDE)
-  file(READ ${SOURCE}/runtime/${platform_header} text)
+  file(COPY ${SOURCE}/runtime/ DESTINATION ${tree})
+  file(READ ${tree}/${platform_header} text)
   if(NOT text MATCHES "#define VESK_VERSION ([0-9]+)\n\n")
     message(FATAL_ERROR "No VESK_VERSION and a blank line in ${platform_header}")
   endif()
   set(VERSION ${CMAKE_MATCH_1})
   string(REPLACE "${CMAKE_MATCH_0}" "#define VESK_VERSION ${VERSION}\n@import \"Vesk/vxObject/Built.h\"\n" text "${text}")
+  file(WRITE ${tree}/${platform_header} "${text}")
   execute_process(COMMAND ${CXX} -std=c++17 -dM -E -x c++ -include cstddef /dev/null OUTPUT_VARIABLE macros
                   COMMAND_ERROR_IS_FATAL ANY)
   read_macro(_GLIBCXX_RELEASE RELEASE_OF_LIBRARY)
   read_macro(_GLIBCXX_USE_CXX11_ABI CXX11_ABI)
   read_macro(__SIZEOF_POINTER__ POINTER_SIZE)
-  # Both are written only when they differ, and copied with their times: what has not changed is not built again.
-  file(WRITE ${FOLDER}/Platform.new "${text}")
-  file(COPY_FILE ${FOLDER}/Platform.new ${FOLDER}/Platform.h ONLY_IF_DIFFERENT)
-  configure_file(${SOURCE}/cmake/Built.h.in ${FOLDER}/Built.h @ONLY)
-  file(COPY ${FOLDER}/Platform.h ${FOLDER}/Built.h DESTINATION ${tree}/Vesk/vxObject)
+  configure_file(${SOURCE}/cmake/Built.h.in ${tree}/Vesk/vxObject/Built.h @ONLY)
+endfunction()
+
+# Of all that the library depends on. Times do not tell: files may be replaced by older ones, and the tool is one of them.
+function(read_state result)
+  set(state "")
+  file(GLOB_RECURSE files LIST_DIRECTORIES false ${SOURCE}/runtime/* ${SOURCE}/cmake/build_runtime.cmake ${SOURCE}/cmake/Built.h.in)
+  foreach(file ${files} ${QREX} ${CXX})
+    file(SHA256 ${file} hash)
+    string(APPEND state "${hash} ${file}\n")
+  endforeach()
+  set(${result} "${state}" PARENT_SCOPE)
+endfunction()
+
+function(prepare_if_changed)
+  read_state(state)
+  if(EXISTS ${FOLDER}/state)
+    file(READ ${FOLDER}/state before)
+  endif()
+  if("${before}" STREQUAL "${state}")
+    return()
+  endif()
+  file(REMOVE_RECURSE ${FOLDER}/state ${FOLDER}/Debug ${FOLDER}/Release)
+  prepare()
+  file(WRITE ${FOLDER}/state "${state}")
 endfunction()
 
 function(build config)
@@ -73,7 +95,7 @@ function(gather)
 endfunction()
 
 if(STEP STREQUAL prepare)
-  prepare()
+  prepare_if_changed()
 elseif(STEP STREQUAL gather)
   gather()
 else()

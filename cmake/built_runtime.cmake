@@ -1,38 +1,48 @@
-# The target built_runtime, which installing asks for: workspaces need not compile the library, then.
+# The runtime as it is installed, so that workspaces need not compile it: the target built_runtime, which the plain build
+# leaves out.
 option(QREX_BUILT_RUNTIME "Install the runtime library built, too" ON)
 find_program(QREX_RUNTIME_CXX NAMES g++ clang++)
 if(NOT QREX_BUILT_RUNTIME OR NOT QREX_RUNTIME_CXX OR NOT CMAKE_STRIP)
   return()
 endif()
 if(QREX_RUNTIME_CXX MATCHES "clang")
-  set(compiler clang)
+  set(runtime_compiler clang)
 else()
-  set(compiler gcc)
+  set(runtime_compiler gcc)
 endif()
-set(folder ${CMAKE_BINARY_DIR}/built)
-file(GLOB_RECURSE sources CONFIGURE_DEPENDS runtime/*)
+set(built ${CMAKE_BINARY_DIR}/built)
+file(GENERATE OUTPUT ${built}/steps-$<CONFIG>.cmake CONTENT "\
+set(SOURCE \"${CMAKE_SOURCE_DIR}\")
+set(FOLDER \"${built}\")
+set(QREX \"$<TARGET_FILE:Qrex>\")
+set(RELEASE ${PROJECT_VERSION_MAJOR}.${PROJECT_VERSION_MINOR})
+set(COMPILER ${runtime_compiler})
+set(CXX \"${QREX_RUNTIME_CXX}\")
+set(STRIP \"${CMAKE_STRIP}\")
+include(\"${CMAKE_SOURCE_DIR}/cmake/build_runtime.cmake\")
+")
 
 function(add_step step)
-  add_custom_command(
-    OUTPUT ${folder}/${step}.stamp
-    COMMAND ${CMAKE_COMMAND} -DSTEP=${step} -DSOURCE=${CMAKE_SOURCE_DIR} -DFOLDER=${folder} -DQREX=$<TARGET_FILE:Qrex>
-            -DRELEASE=${PROJECT_VERSION_MAJOR}.${PROJECT_VERSION_MINOR} -DCOMPILER=${compiler} -DCXX=${QREX_RUNTIME_CXX}
-            -DSTRIP=${CMAKE_STRIP} -P ${CMAKE_SOURCE_DIR}/cmake/build_runtime.cmake
-    COMMAND ${CMAKE_COMMAND} -E touch ${folder}/${step}.stamp
-    DEPENDS ${ARGN} cmake/build_runtime.cmake)
+  add_custom_command(OUTPUT ${built}/${step}.stamp COMMAND ${CMAKE_COMMAND} -DSTEP=${step} -P ${built}/steps-$<CONFIG>.cmake
+                     COMMAND ${CMAKE_COMMAND} -E touch ${built}/${step}.stamp DEPENDS ${ARGN})
 endfunction()
-add_step(prepare ${sources} cmake/Built.h.in)
-add_step(Debug Qrex ${folder}/prepare.stamp)
-add_step(Release Qrex ${folder}/prepare.stamp)
-add_step(gather ${folder}/Debug.stamp ${folder}/Release.stamp)
-add_custom_target(built_runtime DEPENDS ${folder}/gather.stamp)
+file(GLOB_RECURSE sources CONFIGURE_DEPENDS runtime/*)
+add_step(prepare Qrex ${sources} cmake/Built.h.in cmake/build_runtime.cmake)
+add_step(Debug ${built}/prepare.stamp)
+add_step(Release ${built}/prepare.stamp)
+add_step(gather ${built}/Debug.stamp ${built}/Release.stamp)
+add_custom_target(built_runtime DEPENDS ${built}/gather.stamp)
 
-# Without it the sources serve: they are installed as well.
+# A step that finds its work done takes no time. Without a library the sources serve: they are installed as well.
 install(CODE "
-  execute_process(COMMAND \"${CMAKE_COMMAND}\" --build \"${CMAKE_BINARY_DIR}\" --target built_runtime OUTPUT_VARIABLE told
-                  RESULT_VARIABLE status)
-  if(NOT status EQUAL 0)
-    message(WARNING \"The runtime is installed as sources alone:\\n\${told}\")
-  endif()"
+  foreach(step prepare Debug Release gather)
+    execute_process(COMMAND \"${CMAKE_COMMAND}\" -DSTEP=\${step} -P \"${built}/steps-\${CMAKE_INSTALL_CONFIG_NAME}.cmake\"
+                    RESULT_VARIABLE status)
+    if(NOT status EQUAL 0)
+      message(WARNING \"The runtime is installed as sources alone\")
+      file(REMOVE_RECURSE \"${built}/runtime\" \"${built}/include\")
+      break()
+    endif()
+  endforeach()"
   COMPONENT runtime)
-install(DIRECTORY ${folder}/runtime ${folder}/include DESTINATION lib/qrex COMPONENT runtime OPTIONAL)
+install(DIRECTORY ${built}/runtime ${built}/include DESTINATION lib/qrex COMPONENT runtime OPTIONAL)
