@@ -28,7 +28,7 @@ std::vector<std::string> Candidates(const std::string& calledAs) {
     const std::string folder = program.substr(0, program.rfind('/'));
     for (const char* place : {"/.", "/..", "/../share/qrex"}) candidates.push_back(folder + place);
   }
-  candidates.push_back(QREX_DATA_FOLDER);
+  candidates.emplace_back(QREX_DATA_FOLDER);
   return candidates;
 }
 
