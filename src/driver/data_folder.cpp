@@ -37,10 +37,9 @@ bool IsThere(const std::string& path) {
   return static_cast<bool>(platform::Stat(path, info));
 }
 
-// The built library is for the compilers that it was tried with, and for the configurations that it was built in; make
-// files are written for all configurations at once.
-bool IsForBuilt(const ConfigSettings& settings, const std::string& root) {
-  if (settings.compiler != CompilerKind::gcc && settings.compiler != CompilerKind::clang) return false;
+// Whether the root has a library for the run. Make files are written for all configurations at once.
+bool ServesRun(const std::string& root, const ConfigSettings& settings) {
+  if (!CompilerOf(settings.compiler).takesBuiltRuntime) return false;
   if (settings.mode == RunMode::Gen) return IsThere(root);
   return FileExists(root + "/" + settings.platform + "/" + settings.config + kLibrary);
 }
@@ -70,7 +69,7 @@ std::string AddRuntimeRoot(ConfigSettings& settings, const std::string& calledAs
   std::string root = *data + "/" + kRuntimePart;
   if (settings.runtime == RuntimeChoice::Built && data->ends_with(kShared)) {
     const std::string built = data->substr(0, data->size() - (sizeof kShared - 1)) + kBuilt;
-    if (IsForBuilt(settings, built)) {
+    if (ServesRun(built, settings)) {
       std::string release;
       Require(ReadWholeFile(release, built + kReleaseFile), built + kReleaseFile);
       if (release != Version()) {
