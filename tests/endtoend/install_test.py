@@ -70,6 +70,11 @@ def first_workspace(prefix, work):
         subprocess.run(["make", "d"], cwd=workspace, env=environment, check=True, stdout=subprocess.DEVNULL)
         subprocess.run(program, check=True, stdout=subprocess.DEVNULL)
     equal([str(path) for path in (workspace / "x64/Debug/vxObject").glob("*.o")], [])
+    # An upgrade whose files are older than what was translated.
+    (prefix / "lib/qrex/runtime/Vesk/vxObject/library.inc").write_text("#define VESK_LIBRARY_HEADERS 1\n")
+    with open(workspace / "tree/zoo_core/src/zoo_core.cpp", "a") as source:
+        source.write("int more;\n")
+    holds(qrex(prefix, workspace, "zoo.qrex"), "These headers were translated for another build of the runtime", " 1 errors")
 
 
 @installed
