@@ -5,6 +5,7 @@
 #include <set>
 
 #include "driver/config_parser.h"
+#include "driver/data_folder.h"
 #include "driver/init.h"
 #include "driver/manual.h"
 #include "driver/run_workspace.h"
@@ -136,7 +137,8 @@ int CommandLine::RunConfiguration() {
     if (!FileExists(m_configPath)) TraceWriter() << Hint(NoConfigurationHint(m_arguments[configIndex]));
     return 1;
   }
-  const std::string problem = ValidateSettings(m_settings);
+  std::string problem = ValidateSettings(m_settings);
+  if (problem.empty()) problem = AddRuntimeRoot(m_settings, m_arguments[0]);
   if (!problem.empty()) {
     WriteToConsole(problem + "Error in config file " + m_configPath + "\n");
     return 1;

@@ -36,6 +36,7 @@ struct Compiler {
   bool compilesResources = false;
   bool embedsManifest = false;
   std::string_view precompiledPrefix = "";  // of the name of the precompiled header
+  bool takesBuiltRuntime = false;           // what it makes can be linked with what g++ and libstdc++ made
 
   // Projects and their files
   bool keepsRawSwitches = false;  // the text of switches is passed on; else it is read into options
@@ -139,6 +140,7 @@ inline constexpr Compiler kCompilers[] = {
         .kind = CompilerKind::gcc,
         .keyword = "gcc",
         .link = "g++",
+        .takesBuiltRuntime = true,
         .makeTools = "CC = gcc\nCXX = g++\nAR = ar\n",
         .namesLibraries = true,
     }),
@@ -153,6 +155,7 @@ inline constexpr Compiler kCompilers[] = {
         .kind = CompilerKind::clang,
         .keyword = "clang",
         .link = "clang++",
+        .takesBuiltRuntime = true,
         .makeTools = "CC = clang\nCXX = clang++\nAR = libtool -static\n",
     }),
 };

@@ -16,6 +16,7 @@
 namespace qrex {
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
+enum class RuntimeChoice { None, Source, Built };
 
 struct PlatformEnvironment {
   std::string PATH, INCLUDE, LIB;  // `;`-separated lists
@@ -38,6 +39,8 @@ struct ConfigSettings {
   bool diagnostics = false;
   CompilerKind compiler = CompilerKind::vc8;
   bool targetXP = false;
+  std::string platformToolset;  // of .vcxproj files, instead of the compiler's; set: projects may name theirs
+  std::string windowsSdk;       // beside it; empty: the newest
   bool translateOnly = false;
   bool rebuildAll = false;
   bool writeTokenEquivalent = true;
@@ -48,6 +51,7 @@ struct ConfigSettings {
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
   bool compilableText = false;
+  RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;

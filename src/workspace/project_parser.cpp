@@ -234,36 +234,52 @@ void ProjectParser::ParseBuildEvent(BuildEvent ProjectConfig::*event) {
   for (ProjectConfig* config : configs) config->*event = read;
 }
 
+namespace {
+
+constexpr std::string_view kGeneralKeys[] = {"OutputDirectory",
+                                             "IntermediateDirectory",
+                                             "DeleteExtensionsOnClean",
+                                             "BuildLogFile",
+                                             "InheritedPropertySheets",
+                                             "ConfigurationType",
+                                             "UseOfMFC",
+                                             "UseOfATL",
+                                             "ATLMinimizesCRunTimeLibraryUsage",
+                                             "CharacterSet",
+                                             "ManagedExtensions",
+                                             "WholeProgramOptimization"};
+constexpr std::string_view kToolsetKey = "PlatformToolset";
+
+}  // namespace
+
+std::string ProjectParser::ReadGeneralKey() {
+  if (current.kind != kIdentifier) {
+    throw LexScannerException("Expected identifier when read " + Printed(current), current);
+  }
+  const std::string key = current.text.Text();
+  const bool isToolset = key == kToolsetKey;
+  if (isToolset ? m_project.settings->platformToolset.empty()
+                : std::find(std::begin(kGeneralKeys), std::end(kGeneralKeys), key) == std::end(kGeneralKeys)) {
+    throw LexScannerException("Invalid key " + Printed(current), current)
+        .WithHint(isToolset ? "a key where the configuration sets platformToolset" : "");
+  }
+  Advance();
+  return key;
+}
+
 void ProjectParser::ParseGeneral() {
-  static constexpr std::string_view kKeys[] = {"OutputDirectory",
-                                               "IntermediateDirectory",
-                                               "DeleteExtensionsOnClean",
-                                               "BuildLogFile",
-                                               "InheritedPropertySheets",
-                                               "ConfigurationType",
-                                               "UseOfMFC",
-                                               "UseOfATL",
-                                               "ATLMinimizesCRunTimeLibraryUsage",
-                                               "CharacterSet",
-                                               "ManagedExtensions",
-                                               "WholeProgramOptimization"};
   Advance();
   const Configs configs = ReadScope().configs;
   RequireBrace();
   while (current.kind != kCloseBrace) {
-    if (current.kind != kIdentifier) {
-      throw LexScannerException("Expected identifier when read " + Printed(current), current);
-    }
-    if (std::find(std::begin(kKeys), std::end(kKeys), current.text.View()) == std::end(kKeys)) {
-      throw LexScannerException("Invalid key " + Printed(current), current);
-    }
-    const std::string key = current.text.Text();
-    Advance();
+    const std::string key = ReadGeneralKey();
     Expect(kAssign, "=");
     std::string value;
     ReadString(value);
     Advance();
-    for (ProjectConfig* config : configs) config->generalOptions[key] = ForConfig(value, *config);
+    for (ProjectConfig* config : configs) {
+      (key == kToolsetKey ? config->platformToolset : config->generalOptions[key]) = ForConfig(value, *config);
+    }
   }
   Advance();
 }
