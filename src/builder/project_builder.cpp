@@ -16,13 +16,19 @@
 
 namespace qrex {
 
+// Compilers that write into one file of debug information, or read a precompiled header that another source makes, run
+// one after the other.
+size_t ProjectBuilder::SlotCount(const ConfigSettings& settings) {
+  if (!IsGccFamily(settings.compiler)) return 1;
+  return settings.jobs == 0 ? platform::ProcessorCount() : static_cast<size_t>(settings.jobs);
+}
+
 void ProjectBuilder::WriteHeading(std::string_view end) const {
   TraceWriter() << "\n------------------------------------- " << project.name << "  [" << config.name << "|"
                 << config.platform << "] ------------------------------------------" << end;
 }
 
 bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile* singleFile) {
-  const bool isBuild = settings.mode == RunMode::Build;
   if (!settings.translateOnly && settings.Environment()) ApplyEnvironment(*settings.Environment());
   // What these print is searched for words.
   if (RunsTools() && IsGccFamily(settings.compiler)) platform::SetEnvironment("LC_ALL", "C");
@@ -30,19 +36,28 @@ bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile*
   if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
   PrepareFiles(dependencyFile);
   try {
-    for (ScannedFile* file : scanned) ProcessFile(*file, singleFile);
-    scheduler.WaitForAll();
-    if (!project.exported && isBuild) {
-      ReportUnregistered();
-      if (!settings.translateOnly && !m_hasFailed) LinkIfStale();
-    }
-    scheduler.WaitForAll();
+    RunSteps(singleFile);
   } catch (const IException&) {
     Save(dependencyFile);
     throw;
   }
   Save(dependencyFile);
   return !m_hasFailed;
+}
+
+void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
+  try {
+    for (ScannedFile* file : scanned) ProcessFile(*file, singleFile);
+  } catch (const IException&) {
+    scheduler.WaitForAll();  // what was begun ahead of the error is finished
+    throw;
+  }
+  scheduler.WaitForAll();
+  if (!project.exported && settings.mode == RunMode::Build) {
+    ReportUnregistered();
+    if (!settings.translateOnly && !m_hasFailed) LinkIfStale();
+  }
+  scheduler.WaitForAll();
 }
 
 void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {

@@ -26,7 +26,7 @@ class ProjectBuilder : public BuildFiles {
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   int64_t errorCount = 0;
-  Scheduler scheduler{settings.tools, 1};
+  Scheduler scheduler{settings.tools, SlotCount(settings), settings.jobServer.get()};
 
  private:
   struct Object {
@@ -34,7 +34,9 @@ class ProjectBuilder : public BuildFiles {
     const ProjectFile* source = nullptr;
   };
 
+  static size_t SlotCount(const ConfigSettings& settings);
   void WriteHeading(std::string_view end) const;
+  void RunSteps(const ProjectFile* singleFile);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }

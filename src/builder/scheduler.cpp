@@ -2,14 +2,18 @@
 
 #include <algorithm>
 
+#include "text/trace.h"
+
 namespace qrex {
 
 void Scheduler::Add(std::unique_ptr<BuildStep> step, std::function<void(bool)> whenOver) {
   Begun begun;
   begun.step = std::move(step);
   begun.whenOver = std::move(whenOver);
+  AwaitToken();
   RunNext(begun);
   m_begun.push_back(std::move(begun));
+  HoldTraceBehind();
   FinishInOrder();
   while (RunningCount() >= m_slots) WaitForOne();
 }
@@ -24,6 +28,15 @@ void Scheduler::Abandon() {
   while (m_tools.WaitForAny(0)) {
   }
   m_begun.clear();
+  HoldTraceBehind();
+  if (m_jobServer) m_jobServer->KeepTokens(0);
+}
+
+// The first program of a make's job runs on the token of that job.
+void Scheduler::AwaitToken() {
+  constexpr int kBetweenTries = 20;  // milliseconds
+  if (!m_jobServer) return;
+  while (RunningCount() > m_jobServer->TokenCount() && !m_jobServer->TryTakeToken()) WaitForOne(kBetweenTries);
 }
 
 void Scheduler::RunNext(Begun& begun) {
@@ -35,35 +48,47 @@ void Scheduler::RunNext(Begun& begun) {
   begun.id = StartCommand(m_tools, begun.command);
 }
 
-void Scheduler::WaitForOne() {
-  std::optional<platform::Processes::Ended> ended = m_tools.WaitForAny();
+void Scheduler::WaitForOne(int milliseconds) {
+  std::optional<platform::Processes::Ended> ended = m_tools.WaitForAny(milliseconds);
   if (!ended) return;
   const auto begun = std::find_if(m_begun.begin(), m_begun.end(), [&](const Begun& each) {
     return !each.isOver && !each.ended && each.id == ended->id;
   });
-  if (begun != m_begun.end()) begun->ended = std::move(ended);
+  if (begun == m_begun.end()) return;
+  if (ended->end.IsInterrupt()) {  // by the user, of all
+    const Command command = begun->command;
+    Abandon();
+    EndCommand(command, std::move(*ended));
+  }
+  begun->ended = std::move(ended);
   FinishInOrder();
+  if (m_jobServer) m_jobServer->KeepTokens(std::max<size_t>(RunningCount(), 1) - 1);
 }
 
 void Scheduler::FinishInOrder() {
   try {
     while (!m_begun.empty()) {
+      HoldTrace(nullptr);
       Begun& first = m_begun.front();
       if (first.ended) {
         first.step->Finish(EndCommand(first.command, std::move(*first.ended)));
         RunNext(first);
       }
-      if (!first.isOver) return;
+      if (!first.isOver) break;
       const bool hasSucceeded = first.step->HasSucceeded();
-      const auto whenOver = std::move(first.whenOver);
+      first.step.reset();
+      first.whenOver(hasSucceeded);
+      if (!first.textBehind.empty()) WriteHeldToTrace(first.textBehind);
       m_begun.pop_front();
-      whenOver(hasSucceeded);
     }
   } catch (...) {
     Abandon();
     throw;
   }
+  HoldTraceBehind();
 }
+
+void Scheduler::HoldTraceBehind() { HoldTrace(m_begun.empty() ? nullptr : &m_begun.back().textBehind); }
 
 size_t Scheduler::RunningCount() const {
   return static_cast<size_t>(

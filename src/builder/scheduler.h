@@ -1,18 +1,23 @@
-// Carries out the steps of a build, as many at once as there are slots. They begin and are finished in the order in
-// which they were added, so that counts and log do not depend on how many there are.
+// Carries out the steps of a build, as many at once as there are slots, and as the job server of a make permits. They
+// begin and are finished in the order in which they were added, and what is written meanwhile is held back until those
+// ahead of it are finished: so counts and log do not depend on how many there are.
 #pragma once
 
 #include <deque>
 #include <functional>
 #include <memory>
+#include <string>
 
 #include "builder/build_step.h"
+#include "platform/job_server.h"
 
 namespace qrex {
 
 class Scheduler {
  public:
-  Scheduler(platform::Processes& tools, size_t slots) : m_tools(tools), m_slots(slots) {}
+  // `jobServer`: null where there is none.
+  Scheduler(platform::Processes& tools, size_t slots, platform::JobServer* jobServer = nullptr)
+      : m_tools(tools), m_slots(slots), m_jobServer(jobServer) {}
   ~Scheduler() { Abandon(); }
   Scheduler(const Scheduler&) = delete;
   Scheduler& operator=(const Scheduler&) = delete;
@@ -32,15 +37,19 @@ class Scheduler {
     platform::Processes::Id id = 0;
     std::optional<platform::Processes::Ended> ended;
     bool isOver = false;
+    std::string textBehind;  // of the trace log, written since it began
   };
 
   void RunNext(Begun& begun);
-  void WaitForOne();
+  void AwaitToken();
+  void WaitForOne(int milliseconds = platform::Processes::kForever);
+  void HoldTraceBehind();
   void FinishInOrder();
   size_t RunningCount() const;
 
   platform::Processes& m_tools;
   const size_t m_slots;
+  platform::JobServer* const m_jobServer;
   std::deque<Begun> m_begun;  // in the order of their addition; the first is not over yet
 };
 

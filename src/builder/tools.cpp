@@ -121,7 +121,10 @@ class ResourceObjectStep : public BuildStep {
       ++m_builder.errorCount;
       return std::nullopt;
     }
-    return Command{.line = line.TakeText(), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
+    return Command{.line = line.TakeText(),
+                   .echo = m_builder.settings.diagnostics,
+                   .failOnNonZero = true,
+                   .holdsText = m_builder.scheduler.Overlaps()};
   }
 
   void Finish(const CommandResult& result) override {

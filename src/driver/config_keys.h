@@ -45,6 +45,11 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
      "also write a translation that differs in blanks and comments alone"},
     {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
+    {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
+};
+
+inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {
+    {"jobs", &ConfigSettings::jobs, "so many compilers at once; 0: as many as there are processors"},
 };
 
 inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kListKeys[] = {

@@ -1,5 +1,7 @@
 #include "driver/config_parser.h"
 
+#include <algorithm>
+
 #include "driver/config_keys.h"
 #include "lex/literals.h"
 #include "text/paths.h"
@@ -54,6 +56,7 @@ class ConfigParser : public MpfwParser {
   void ParseVariable();
   void ParseEnvironment(std::string PlatformEnvironment::*field);
   void ParseList(std::vector<std::string>& list);
+  void ParseNumberKey(int64_t& number);
   bool ReadAssignment();  // `=` or `+=`; true: the list starts anew
   std::string ReadWord();
   void ReadName(std::string& out);  // of what is put in quotes on command lines
@@ -113,6 +116,7 @@ void ConfigParser::ParseStatement() {
   if (current.kind == kDollar) return ParseVariable();
   if (const auto* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
   if (const auto* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
+  if (const auto* key = FindRow(kNumberKeys, current)) return ParseNumberKey(m_settings.*key->field);
   if (const auto* key = FindRow(kStringKeys, current)) {
     Advance();
     Expect(kAssign, "=");
@@ -197,6 +201,19 @@ void ConfigParser::ParseEnvironment(std::string PlatformEnvironment::*field) {
     if (!list.empty()) list += ';';
     list += entry;
   }
+  Advance();
+}
+
+void ConfigParser::ParseNumberKey(int64_t& number) {
+  constexpr size_t kMostDigits = 6;
+  Advance();
+  Expect(kAssign, "=");
+  std::string word = current.text.Text();
+  SubstituteVariables(word);
+  const bool isNumber = !word.empty() && word.size() <= kMostDigits &&
+                        std::all_of(word.begin(), word.end(), [](char c) { return c >= '0' && c <= '9'; });
+  if (!isNumber) FailExpected("number");
+  number = std::stoll(word);
   Advance();
 }
 

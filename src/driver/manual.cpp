@@ -62,6 +62,7 @@ std::vector<ManualRow> KeyRows() {
     add(key.word, defaults.*key.field ? " = true" : " = false", key.help);
     rows.back().values = {"true", "false"};
   }
+  for (const auto& key : kNumberKeys) add(key.word, " = " + std::to_string(defaults.*key.field), key.help);
   for (const auto& key : kEnvironmentKeys) add(key.word, "(\"platform\") = { }", key.help);
   for (const auto& key : kPathVariables)
     rows.push_back({"$" + Word(key.word, " = \"\""), {}, {}, std::string(key.help)});

@@ -170,7 +170,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   if (m_warnings > 0 || m_errors > 0) {
     timer.Label() << " with " << m_warnings << " warnings, " << m_errors << " errors";
   }
-  return m_settings.mode != RunMode::Clean || m_errors == 0;
+  return m_errors == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
 }
 
 // After an error that ends the run.
@@ -464,6 +464,7 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   const bool builds = settings.mode == RunMode::Build || settings.mode == RunMode::Compile;
   const KeeperEnd keeperEnd{settings.tools};
   if (builds && !settings.translateOnly) {
+    if (settings.jobs != 1) settings.jobServer = platform::JobServer::FromEnvironment();
     WaitForOtherBuilds(folder);
     if (!settings.outputNotes.DeleteNoted()) return false;
   }

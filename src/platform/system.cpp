@@ -16,6 +16,7 @@
 #include <cstdlib>
 #include <ctime>
 #include <exception>
+#include <thread>
 
 #include "platform/file_system.h"
 
@@ -108,6 +109,8 @@ WorkingFolder::~WorkingFolder() {
 }
 
 void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(m_descriptor); }
+
+size_t ProcessorCount() { return std::max(1u, std::thread::hardware_concurrency()); }
 
 std::string FindProgram(const std::string& calledAs) {
   const std::string found = calledAs.find('/') == std::string::npos ? PathOnPath(calledAs) : calledAs;

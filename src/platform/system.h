@@ -35,6 +35,7 @@ class WorkingFolder {
 // Of this program, with symbolic links resolved. Where the system does not tell, it is found by the first word of its
 // command line: a path, or a name on PATH; empty: not found.
 std::string ProgramPath(const std::string& calledAs);
+size_t ProcessorCount();                               // that this process may use; at least 1
 std::string FindProgram(const std::string& calledAs);  // by that word alone
 uint64_t CurrentThreadId();
 bool IsProcessRunning(uint64_t id);

@@ -16,6 +16,7 @@ constexpr size_t kMaxPending = 16384;
 thread_local int64_t traceIndent = 0;
 bool stampLines = false;
 TraceHook* traceHook = nullptr;
+std::string* heldTrace = nullptr;
 
 // Keeps what comes before a target exists, up to a bound.
 class TraceSink {
@@ -110,9 +111,17 @@ void CloseTrace() { Sink().Close(); }
 void SetTraceHook(TraceHook* hook) { traceHook = hook; }
 
 void WriteToTrace(std::string_view text) {
-  if (traceIndent < 1 && !stampLines) return Sink().Write(text);
-  Sink().Write(WithLinePrefix(text));
+  std::string prefixed;
+  if (traceIndent > 0 || stampLines) text = prefixed = WithLinePrefix(text);
+  if (heldTrace) {
+    *heldTrace += text;
+  } else {
+    Sink().Write(text);
+  }
 }
+
+void HoldTrace(std::string* held) { heldTrace = held; }
+void WriteHeldToTrace(std::string_view text) { Sink().Write(text); }
 
 void WriteToConsole(std::string_view text) {
   if (platform::IsValidUtf8(text)) return platform::WriteStdout(text);

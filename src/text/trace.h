@@ -17,6 +17,9 @@ bool OpenTrace(const std::string& path, bool append, bool stampLines);  // "stdo
 void CloseTrace();
 void SetTraceHook(TraceHook* hook);        // not owned; null removes it. Tests capture messages through it
 void WriteToTrace(std::string_view text);  // what a TraceWriter's end calls
+// What is written from now on is added there instead, for whoever has to bring it into an order; null: to the log.
+void HoldTrace(std::string* held);
+void WriteHeldToTrace(std::string_view text);  // what was held
 
 // Writes to standard output as UTF-8 through the console writer, unbuffered by the tool.
 void WriteToConsole(std::string_view text);

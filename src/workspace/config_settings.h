@@ -2,11 +2,13 @@
 #pragma once
 
 #include <map>
+#include <memory>
 #include <string>
 #include <unordered_set>
 #include <vector>
 
 #include "macro/mpfw_parser.h"
+#include "platform/job_server.h"
 #include "platform/process.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -51,6 +53,8 @@ struct ConfigSettings {
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
   bool compilableText = false;
+  int64_t jobs = 1;  // tools at once; 0: as many as there are processors
+  bool failOnErrors = false;
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   RunMode fileMode = RunMode::Build;  // without what the command line added
@@ -59,6 +63,7 @@ struct ConfigSettings {
   mutable LeftoverSweep leftovers;
   mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
   mutable platform::Processes tools;
+  std::unique_ptr<platform::JobServer> jobServer;  // of the make that runs this program; null: none
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
 

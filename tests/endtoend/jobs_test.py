@@ -1,0 +1,109 @@
+#!/usr/bin/env python3
+"""Compilers beside each other: what a run with jobs tells and leaves is what one without does."""
+
+import os
+import re
+import signal
+import subprocess
+import sys
+import time
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+
+# Takes the longer the earlier its source comes, so that ends come in another order; notes how many run at once.
+COMPILER = r"""#!/bin/bash
+rsp=${2#@}; read -r text < "$rsp"
+object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
+touch "running/$$"; ls running | wc -l >> most; echo half > "$object"
+number=${source//[^0-9]/}; number=${number: -1}
+sleep "0.$(printf %03d $((30 * (9 - number))))"; rm "running/$$"
+case $number in
+  2) echo "$source:1:1: warning: two";;
+  5) echo "$source:1:1: error: five" >&2; rm "$object"; exit 1;;
+  6) kill -ABRT $$;;
+esac
+cat "$source" > "$object"
+"""
+ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
+PROJECT = '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n{ "src" { %s } }\n'
+
+
+def files(faulty):
+    made = {"all.qrex": SETTINGS, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "good" "bad" }\n', "running/.keep": "",
+            "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER}
+    for name, numbers in (("good", (0, 1, 3, 4, 7)), ("bad", range(8) if faulty else ())):
+        sources = [f"{name}{number}.cpp" for number in numbers] + [f"{name}.cpp"]
+        made[f"tree/{name}/src/{name}.qrpj"] = PROJECT % (name, " ".join(f'"{source}"' for source in sources))
+        made.update({f"tree/{name}/src/{source}": f"int {source[:-4]};\n" for source in sources})
+    return made
+
+
+def told(text):
+    """A log without what has to differ."""
+    text = re.sub(r"\.{3,} *[\d.]+ ms|argv\[\d\] = jobs=.*\n|process \d+", "", text)
+    return re.sub(r"[\w/]*(compiler|\.o)\.rsp", "RSP", text)
+
+
+def left(workspace):
+    return {name: workspace.path(name).read_bytes() for pattern in ("x64/**/*", "out/**/*", "qrexsource/**/*.cpp")
+            for name in workspace.times(pattern) if workspace.path(name).is_file()}
+
+
+def compare(workspace, *arguments, status=0):
+    outcomes = []
+    for jobs in ("1", "4", "0"):
+        workspace.shell("rm -rf x64 out qrexsource most")
+        log = workspace.run("all.qrex", f"jobs={jobs}", *arguments, status=status)
+        outcomes.append((told(log), left(workspace)))
+        most = max(map(int, workspace.path("most").read_text().split()))
+        assert most == 1 if jobs == "1" else 1 < most <= 4 or jobs == "0", f"{most} at once with {jobs} jobs"
+    for outcome in outcomes[1:]:
+        equal(outcome, outcomes[0])
+    return outcomes[0][0]
+
+
+@in_workspace(files(True))
+def test_log_and_outputs_are_those_of_one_job(workspace):
+    log = compare(workspace)
+    holds(log, "warning: two", "error: five", "ended by signal 6", "1 warnings, 2 errors")
+    compare(workspace, "diagnostics=true")
+    compare(workspace, "failOnErrors=true", status=1)
+
+
+@in_workspace(files(True))
+def test_translation_error_behind_running_compilers(workspace):
+    workspace.write("tree/bad/src/bad4.cpp", "$class+ Broken {\n")
+    holds(compare(workspace, status=1), "warning: two", "bad4.cpp")
+    equal(workspace.path("x64/Debug/bad/bad3.o").read_text().strip(), "int bad3;")
+
+
+@in_workspace(files(False))
+def test_interrupt_leaves_nothing_half_made(workspace):
+    for number in (signal.SIGINT, signal.SIGTERM, signal.SIGKILL):
+        workspace.shell("rm -rf x64 out qrexsource most running/*")
+        with subprocess.Popen([workspace.binary, "all.qrex", "jobs=4"], cwd=workspace.folder, stdout=subprocess.PIPE,
+                              start_new_session=True) as run:
+            while len(os.listdir(workspace.path("running"))) < 4:
+                time.sleep(0.01)
+            (os.killpg if number == signal.SIGINT else os.kill)(run.pid, number)
+            run.communicate(timeout=60)
+        workspace.shell("rm -f running/*")
+        lacks(workspace.run("all.qrex", "jobs=4"), "errors")
+        objects = [name for name in workspace.times("x64/**/*.o") if "half" in workspace.path(name).read_text()]
+        equal((objects, workspace.times("x64/**/*.rsp")), ([], {}))
+
+
+@in_workspace(files(False), "make")
+def test_make_grants_jobs(workspace):
+    # With `+` the recipe is given the job server; without it the numbers alone, which lead nowhere.
+    workspace.write("Makefile", "granted:\n\t+@Qrex all.qrex jobs=4 > log\nkept:\n\t@Qrex all.qrex jobs=4 > log\n")
+    for target, bound in (("granted", 2), ("kept", 4)):
+        workspace.shell("rm -rf x64 out qrexsource most")
+        lacks(workspace.shell(f"make -j2 {target}"), "jobserver")
+        equal(max(map(int, workspace.path("most").read_text().split())), bound)
+
+
+run_tests([test_log_and_outputs_are_those_of_one_job, test_translation_error_behind_running_compilers,
+           test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])
