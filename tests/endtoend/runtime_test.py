@@ -66,7 +66,7 @@ def translate(binary, workspace_file, keys="", tree=HERE / "runtime" / "tree"):
 
 
 # What every program needs of the library; the rest is for values by name and JSON.
-LIBRARY = ("byte_code", "graph", "layout", "models", "objects", "registry", "releases", "remote", "sources", "vxObject")
+LIBRARY = ("byte_code", "graph", "layout", "models", "objects", "registry", "releases", "remote", "sources", "stack", "vxObject")
 VALUES = ("access", "containers", "json_reader", "json_scalars", "json_scanner", "json_text", "json_writer", "value_types")
 
 

@@ -1,7 +1,8 @@
 // The dependency graph. A node that is read while another one is being calculated becomes an input of that one. A
 // change of an input makes everything behind it dirty, without calculating anything. A dirty node is brought up to date
 // when it is next read: its inputs first, and itself only if one of them really changed. Chains may be of any length:
-// what is dirty, and what has to be looked at, is kept in work lists, not on the stack.
+// what is dirty, and what has to be looked at, is kept in work lists, and calculations within each other go on on a
+// stack of their own.
 //
 // A calculation may write what it has read. The value that it answers stands until the outermost read ends; then the
 // node is dirty again. One that throws leaves its node dirty; the error is not looked for twice within one read.
@@ -107,6 +108,8 @@ class DGNode : private QueuePlace, private ChangePlace {
   void Update(GraphState& state) const;
   void LookAtInputs(GraphState& state) const;
   void Calculate(GraphState& state) const;
+  void CalculateHere(GraphState& state) const;
+  void CalculateElsewhere(GraphState& state) const;
   void Recalculate(GraphState& state) const;
 
   void Mark(bool hard, Changes& dirty) const;

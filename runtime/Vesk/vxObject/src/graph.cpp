@@ -16,7 +16,12 @@ GraphState::~GraphState() {}
 
 void GraphState::Begin() {
   m_isEvaluating = true;
+  MeasureStack(MostCalculationStack);
+}
+
+inline void GraphState::MeasureStack(std::uintptr_t most) {
   m_stack = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
+  m_mostStack = most;
 }
 
 void GraphState::Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
@@ -34,7 +39,7 @@ inline bool GraphState::IsWaiting(DGNode const* node) const {
 
 inline bool GraphState::IsDeep() const {
   const std::uintptr_t here = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
-  return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > MostCalculationStack;
+  return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > m_mostStack;
 }
 
 void GraphState::OnDestroy(DGNode const* node) {
@@ -300,13 +305,37 @@ void DGNode::LookAtInputs(GraphState& state) const {
 
 void DGNode::Calculate(GraphState& state) const {
   if (m_isCalculating) throw GraphError("cyclic dependency: " + Name());
-  const auto failed = state.m_failed.find(this);
-  if (failed != state.m_failed.end()) std::rethrow_exception(failed->second);
+  if (!state.m_failed.empty()) {
+    const auto failed = state.m_failed.find(this);
+    if (failed != state.m_failed.end()) std::rethrow_exception(failed->second);
+  }
   if (state.IsWaiting(this)) throw GraphError("cyclic dependency: " + Name());
-  if (state.IsDeep()) {
+  if (state.IsDeep()) return CalculateElsewhere(state);
+  CalculateHere(state);
+}
+
+// On the other stack; where that is used up, or there is none, further out.
+void DGNode::CalculateElsewhere(GraphState& state) const {
+  if (!state.m_otherStack.Open()) {
     state.m_deep = this;
     throw DeepRead();
   }
+  struct Stack {
+    ~Stack() {
+      m_state.m_stack = m_stack;
+      m_state.m_mostStack = m_most;
+    }
+    GraphState& m_state;
+    std::uintptr_t m_stack = m_state.m_stack, m_most = m_state.m_mostStack;
+  } stack{state};
+  const auto calculate = [&] {
+    state.MeasureStack(state.m_otherStack.Usable());
+    CalculateHere(state);
+  };
+  state.m_otherStack.Run(calculate);
+}
+
+void DGNode::CalculateHere(GraphState& state) const {
   try {
     Recalculate(state);
   } catch (DeepRead const&) {
@@ -401,6 +430,7 @@ inline void Empty(xvector<T>& list) {
 void GraphState::End() {
   m_isEvaluating = false;
   m_deep = nullptr;
+  m_otherStack.Close();
   Empty(m_failed);
   Empty(m_targets);
   Empty(m_steps);
