@@ -101,6 +101,7 @@ class DGNode : private QueuePlace, private ChangePlace {
   static xvector<DGNode const*> NodesOf(Links const& links);
   static void MakeRoom(Links& links);
   void TellDependents() const;
+  void TellTheOne() const;
 
   void BringUpToDate(GraphState& state) const;
   void BeginRead(GraphState& state) const;
@@ -117,6 +118,7 @@ class DGNode : private QueuePlace, private ChangePlace {
     if (again > m_again) m_again = again;
   }
   static void Spread(GraphState& state, Changes& dirty);
+  static void Tell(Changes& dirty);
 
   void Forget() const;
   void DropDependents(GraphState* state, Changes& dirty) const;
@@ -134,6 +136,15 @@ class DGNode : private QueuePlace, private ChangePlace {
   mutable EvictionQueue* m_queue = nullptr;  // where it is queued
   mutable std::size_t m_unwound = 0;         // the serial of the target that it waits for
 };
+
+inline Calculation::Calculation(GraphState& state, DGNode const* node)
+    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
+  if (node) node->m_isCalculating = true;
+}
+inline Calculation::~Calculation() {
+  if (m_node) m_node->m_isCalculating = false;
+  m_state.m_calculation = m_outer;
+}
 
 // The node of a `$dep` field.
 class DGDepNode : public DGNode {

@@ -116,10 +116,12 @@ void DGNode::Link(GraphState& state) const {
 }
 
 // Takes a link out of a list of links; the last one takes its place. `backwards`: the lists at the other ends.
-void DGNode::Drop(Links& links, Links DGNode::*backwards, std::size_t at) {
-  links[at] = links.back();
+inline void DGNode::Drop(Links& links, Links DGNode::*backwards, std::size_t at) {
+  if (at + 1 < links.size()) {
+    links[at] = links.back();
+    (const_cast<DGNode*>(links[at].m_node)->*backwards)[links[at].m_at].m_at = at;
+  }
   links.pop_back();
-  if (at < links.size()) (const_cast<DGNode*>(links[at].m_node)->*backwards)[links[at].m_at].m_at = at;
 }
 
 // Leaves the graph behind it.
@@ -174,7 +176,11 @@ void DGNode::Spread(GraphState& state, Changes& dirty) {
   for (NodePlace const* at = dirty.First(); at != dirty.End(); at = at->m_next) {
     for (NodeLink const& link : Changed(at)->m_dependents) link.m_node->Mark(false, dirty);
   }
+  if (!state.m_calculation) return Tell(dirty);
   Calculation detached(state, nullptr);
+  Tell(dirty);
+}
+inline void DGNode::Tell(Changes& dirty) {
   while (!dirty.IsEmpty()) {
     DGNode const* node = Changed(dirty.First());
     dirty.First()->Leave();
@@ -197,13 +203,30 @@ void DGNode::InvalidateDependents() const {
 
 void DGNode::TellDependents() const {
   GraphState& state = GraphState::Get();
+  if (!state.m_calculation && m_dependents.size() == 1 && m_dependents[0].m_node->m_dependents.empty()) {
+    return TellTheOne();
+  }
   Changes dirty;
   DropDependents(&state, dirty);
   OnNoDependents();
   Spread(state, dirty);
 }
+// What is most often so: one value depends on the node, nothing on that, and nothing is being calculated.
+inline void DGNode::TellTheOne() const {
+  DGNode const* node = m_dependents[0].m_node;
+  Drop(node->m_inputs, &DGNode::m_dependents, m_dependents[0].m_at);
+  m_dependents.clear();
+  const bool wasClean = std::exchange(node->m_state, EState::Hard) == EState::Clean;
+  OnNoDependents();
+  if (wasClean) node->OnInvalidate();
+}
 
 void DGNode::Change(Changes& nodes) {
+  if (nodes.First()->m_next == nodes.End()) {
+    DGNode const* node = Changed(nodes.First());
+    nodes.First()->Leave();
+    return node->Change();
+  }
   GraphState& state = GraphState::Get();
   Changes dirty;
   while (!nodes.IsEmpty()) {
@@ -218,6 +241,7 @@ void DGNode::Change(Changes& nodes) {
 // --- Calculating
 
 void DGNode::BringUpToDate(GraphState& state) const {
+  if (!state.m_calculation && !state.m_isEvaluating) return BeginRead(state);
   FailedRead failed{state, this, state.m_calculation ? state.m_calculation->m_node : nullptr};
   if (m_isCalculating) throw GraphError("cyclic dependency: " + Name());
   if (!state.m_isEvaluating) {
@@ -370,15 +394,6 @@ inline void DGNode::Recalculate(GraphState& state) const {
   Changes dirty;
   for (NodeLink const& link : m_dependents) link.m_node->Mark(true, dirty);
   Spread(state, dirty);
-}
-
-Calculation::Calculation(GraphState& state, DGNode const* node)
-    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
-  if (node) node->m_isCalculating = true;
-}
-Calculation::~Calculation() {
-  if (m_node) m_node->m_isCalculating = false;
-  m_state.m_calculation = m_outer;
 }
 
 void Calculation::Forget(DGNode const* node, DGNode const* input) {
