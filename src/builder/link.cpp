@@ -78,7 +78,7 @@ std::string VisualLinkerText(const ProjectBuilder& builder, const std::vector<st
   return text;
 }
 
-// The names that stand in double quotes in the linker switches: libraries, unless they are switches or, with a `$`,
+// The names in double quotes in the linker switches: libraries, unless they are switches or, with a `$`,
 // left to make files.
 std::vector<std::string> QuotedLibraries(const ProjectConfig& config) {
   std::vector<std::string> libraries;

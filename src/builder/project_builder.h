@@ -87,7 +87,7 @@ class ProjectBuilder : public TranslationHost {
   mutable std::unordered_map<const ScannedFile*, LineStarts> m_lineStarts;  // of those that messages were about
 };
 
-// Copies what stands outside the project's `src` folder to the export directories, translated and as it is.
+// Copies what is outside the project's `src` folder to the export directories, translated and as it is.
 void ExportPublicHeaders(Project& project, ProjectConfig& config);
 
 // qrexsource/PLATFORM/CONFIG, and the dependency file of a project there.

@@ -1,9 +1,9 @@
-// Which .cpp holds the reflection tail of which header. A tail stands in the output of the first .cpp, in the order of
+// Which .cpp holds the reflection tail of which header. A tail is in the output of the first .cpp, in the order of
 // the build, that imports the header directly (or of the header's own .cpp alone). So an edit of one .cpp can move a
 // tail into or out of the output of another that is not stale, and that must be written again too: else two outputs
 // hold the tail, or none.
 //
-// Where the tails stand needs no record of its own: it follows from the imports in the dependency file, as long as the
+// Where the tails are needs no record of its own: it follows from the imports in the dependency file, as long as the
 // outputs agree with these. Whatever does not agree when they are saved is stale in the next run.
 #pragma once
 

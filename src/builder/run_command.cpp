@@ -1,7 +1,5 @@
 #include "builder/run_command.h"
 
-#include <cerrno>
-
 #include "lex/token.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -22,25 +20,26 @@ constexpr int kEndedBySignal = 128;  // plus the signal
 constexpr int kLastSignal = 64;
 constexpr int kInterrupt = 2, kQuit = 3;
 
-void ReportNoInterpreter(int error) {
+void ReportNoInterpreter(platform::NoInterpreter cause) {
+  using platform::NoInterpreter;
   TraceWriter trace;
   trace << "ERROR running command interpreter\n";
-  switch (error) {
-    case ENOENT:
+  switch (cause) {
+    case NoInterpreter::NotFound:
       trace << "Command interpreter cannot be found\n";
       break;
-    case E2BIG:
+    case NoInterpreter::LineTooLong:
       trace << "Argument List is too big\n";
       break;
-    case ENOEXEC:
+    case NoInterpreter::NotAProgram:
       trace << "Command-interpreter file has invalid format and is not executable\n";
       break;
-    case ENOMEM:
+    case NoInterpreter::NoMemory:
       trace << "Not enough memory is available to execute command;\n"
                "or available memory has been corrupted; or invalid block exists,\n"
                "indicating that process making call was not allocated properly.\n";
       break;
-    default:
+    case NoInterpreter::OtherCause:
       break;
   }
 }
@@ -98,9 +97,9 @@ bool RunCommand(platform::ToolKeeper& tools, const std::string& command, int& re
 
   returnCode = platform::RunCommand(tools, line);
   if (returnCode == -1) {
-    const int error = errno;
+    const platform::NoInterpreter cause = platform::WhyNoInterpreter();
     fail("");
-    ReportNoInterpreter(error);
+    ReportNoInterpreter(cause);
     return false;
   }
   if (returnCode == kEndedBySignal + kInterrupt || returnCode == kEndedBySignal + kQuit) {

@@ -19,7 +19,7 @@ struct CommandOptions {
   bool failOnErrorText = false;
 };
 
-// False when the command could not be run or failed as the options say; the trace log has told why. `returnCode` is the
+// False when the command could not be run or failed as the options say; the trace log says why. `returnCode` is the
 // interpreter's. Throws a LexScannerException when the user interrupted the tool: that ends the run.
 bool RunCommand(platform::ToolKeeper& tools, const std::string& command, int& returnCode,
                 const CommandOptions& options);

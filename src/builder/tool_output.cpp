@@ -21,7 +21,7 @@ bool StripIgnoringCase(std::string& path, const std::string& prefix) {
   return true;
 }
 
-constexpr size_t kLongestPath = 32'767;           // of any system; beyond it stands a line of many messages
+constexpr size_t kLongestPath = 32'767;           // of any system; beyond it comes a line of many messages
 constexpr int64_t kLastLine = 1'000'000'000'000;  // no file is longer; further digits of a number are only passed over
 
 // A message in a line: where the file name ends, the number, and the text behind.
@@ -65,7 +65,7 @@ class OutputScanner {
     }
   }
 
-  // Does the number of a message stand behind the `(` or `:` at `at`?
+  // Is the number of a message behind the `(` or `:` at `at`?
   bool ReadMessage(std::string_view line, size_t begin, size_t at, Message& message) const {
     const char opening = line[at];
     const bool isColonForm = opening == ':' && IsGccFamily(m_builder.settings.compiler);

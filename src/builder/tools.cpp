@@ -1,4 +1,4 @@
-// Compilers, assembler, resource compiler. The linker stands in link.cpp.
+// Compilers, assembler, resource compiler. The linker is in link.cpp.
 
 #include "builder/tools.h"
 
@@ -85,7 +85,7 @@ std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file,
   return text.TakeText();
 }
 
-// False when the tool could not be run at all: the trace log has told why.
+// False when the tool could not be run at all: the trace log says why.
 bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& responseFile, const std::string& text,
                        const std::string& command, std::string& output, int& returnCode) {
   CommandOptions options;

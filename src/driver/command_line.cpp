@@ -2,10 +2,11 @@
 
 #include <algorithm>
 #include <iterator>
+#include <set>
 
 #include "driver/config_parser.h"
-#include "driver/help.h"
 #include "driver/init.h"
+#include "driver/manual.h"
 #include "driver/run_workspace.h"
 #include "lex/literals.h"
 #include "platform/system.h"
@@ -53,10 +54,12 @@ bool IsAlmost(std::string_view word, std::string_view other) {
 
 // For what was taken for the path of a configuration, and is none.
 std::string NoConfigurationHint(const std::string& argument) {
-  constexpr std::string_view kOptions[] = {"--help", "--init", "--version"};
   if (argument.starts_with("-")) {
+    std::set<std::string_view> options;
+    for (const CallForm& form : kCallForms) options.insert(form.option);
+    options.erase("");
     std::string all;
-    for (std::string_view option : kOptions) {
+    for (const std::string_view option : options) {
       if (IsAlmost(argument, option)) return "did you mean " + std::string(option) + "?";
       all.append(" ").append(option);
     }
@@ -157,7 +160,7 @@ int RunInit(const std::vector<std::string>& arguments) {
     return 1;
   }
   const std::string folder = NormalisePath(arguments.back());
-  return InitWorkspace(arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
+  return InitWorkspace(arguments[0], arguments[2], folder.empty() ? "." : folder) ? 0 : 1;
 }
 
 }  // namespace

@@ -46,7 +46,7 @@ class ConfigParser : public MpfwParser {
   void ParseList(std::vector<std::string>& list);
   bool ReadAssignment();  // `=` or `+=`; true: the list starts anew
   std::string ReadWord();
-  void ReadName(std::string& out);  // of what stands in quotes on command lines
+  void ReadName(std::string& out);  // of what is put in quotes on command lines
   void SplitTargetDirectory(const std::string& path);
 
   ConfigSettings& m_settings;

@@ -3,7 +3,6 @@
 #include <algorithm>
 #include <vector>
 
-#include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -38,17 +37,20 @@ bool IsIdentifier(const std::string& name) {
 }
 
 // The folder that holds templates and runtime: beside the program, around it (a build folder in the sources), or where
-// an installation puts them.
-bool FindData(std::string& data) {
-  const std::string program = platform::ProgramPath();
-  const std::string folder = program.substr(0, program.rfind('/'));
+// an installation puts them, seen from the program or from the root.
+bool FindData(const std::string& calledAs, std::string& data) {
+  std::vector<std::string> candidates;
+  if (const std::string program = platform::ProgramPath(calledAs); !program.empty()) {
+    const std::string folder = program.substr(0, program.rfind('/'));
+    for (const char* place : {".", "..", "../share/qrex"}) candidates.push_back(folder + "/" + place);
+  }
+  candidates.push_back(QREX_DATA_FOLDER);
   std::string tried;
-  for (const char* place : {".", "..", "../share/qrex"}) {
-    const std::string candidate = folder + "/" + place;
+  for (const std::string& candidate : candidates) {
     platform::FileInfo templates, runtime;
     if (platform::Stat(candidate + "/" + kTemplates, templates) &&
         platform::Stat(candidate + "/" + kRuntime, runtime)) {
-      if (!RealPathOf(candidate, data)) throw FileException(candidate);
+      Require(RealPathOf(candidate, data), candidate);
       return true;
     }
     tried += "\n    " + candidate;
@@ -84,7 +86,7 @@ class Layout {
       }
       LaidOutFile& file = m_files.emplace_back();
       file.path = target;
-      if (!ReadWholeFile(file.text, from + "/" + source)) throw FileException(from + "/" + source);
+      Require(ReadWholeFile(file.text, from + "/" + source), from + "/" + source);
       ReplaceAllInPlace(file.text, kNameInTexts, m_name);
       ReplaceAllInPlace(file.text, kRuntimeInTexts, m_runtime);
     }
@@ -103,14 +105,15 @@ class Layout {
 
 enum class Place { Free, Ours, Taken };
 
-// What stands where the file is to go. One with its very text is of an earlier call, which did not come to its end.
+// What is there already where the file is to go. One with its very text is of an earlier call, which did not come to
+// its end.
 Place PlaceOf(const LaidOutFile& file) {
   std::string there;
-  if (ReadWholeFile(there, file.path)) return there == file.text ? Place::Ours : Place::Taken;
-  const uint32_t code = platform::LastError();
-  if (platform::IsNotFound(code)) return Place::Free;
+  const platform::Result read = ReadWholeFile(there, file.path);
+  if (read) return there == file.text ? Place::Ours : Place::Taken;
+  if (read.IsNotFound()) return Place::Free;
   platform::FileInfo info;
-  if (!platform::Stat(file.path, info)) throw FileException(code, file.path);
+  if (!platform::Stat(file.path, info)) Require(read, file.path);
   return Place::Taken;
 }
 
@@ -123,11 +126,11 @@ void Write(LeftoverSweep& leftovers, const std::string& path, const std::string&
 // The folder comes to be as a whole.
 void LayOutBeside(const std::vector<LaidOutFile>& files, const std::string& folder) {
   const std::string beside = folder + kBesideEnd;
-  if (!platform::RemoveTree(beside)) throw FileException(beside);  // of a call that was killed
+  Require(platform::RemoveTree(beside), beside);  // of a call that was killed
   try {
     LeftoverSweep leftovers;
     for (const LaidOutFile& file : files) Write(leftovers, beside + file.path.substr(folder.size()), file.text);
-    if (!platform::RenameFile(beside, folder)) throw FileException(folder);
+    Require(platform::RenameFile(beside, folder), folder);
   } catch (...) {
     platform::RemoveTree(beside);
     throw;
@@ -136,13 +139,13 @@ void LayOutBeside(const std::vector<LaidOutFile>& files, const std::string& fold
 
 bool IsMissing(const std::string& folder) {
   platform::FileInfo info;
-  return !platform::Stat(folder, info) && platform::LastError() == platform::kErrorFileNotFound;
+  return platform::Stat(folder, info).Code() == platform::kErrorFileNotFound;
 }
 
-bool LayOut(const std::string& name, const std::string& folder) {
+bool LayOut(const std::string& calledAs, const std::string& name, const std::string& folder) {
   if (!IsIdentifier(name)) return Complain(name + " can't name a workspace: letters, digits and _, a letter first");
   std::string data;
-  if (!FindData(data)) return false;
+  if (!FindData(calledAs, data)) return false;
   const Layout layout(name, folder, data);
   std::vector<LaidOutFile> missing;
   for (const LaidOutFile& file : layout.Files()) {
@@ -165,9 +168,9 @@ bool LayOut(const std::string& name, const std::string& folder) {
 
 }  // namespace
 
-bool InitWorkspace(const std::string& name, const std::string& folder) {
+bool InitWorkspace(const std::string& calledAs, const std::string& name, const std::string& folder) {
   try {
-    return LayOut(name, folder);
+    return LayOut(calledAs, name, folder);
   } catch (const FileException& exception) {
     return Complain(ExceptionText(exception));
   }

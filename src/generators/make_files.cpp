@@ -45,8 +45,7 @@ void WriteLibraries(TextWriter& out, const Project& project) {
 void WriteVariables(TextWriter& out, const Project& project, const ProjectConfig& config, std::string_view target) {
   const auto includes = IncludePaths(project, config, project.usesQrex);
   auto writeInclude = [&](const std::string& path) { Write(out, R"( -I"$path$")", "path"_ = path); };
-  Write(
-      out, R"(
+  Write(out, R"(
     # Tools
     $tools$
 
@@ -61,9 +60,9 @@ void WriteVariables(TextWriter& out, const Project& project, const ProjectConfig
     INCLUDE_PATH = $includes$
 
   )",
-      "tools"_ = [&] { out << CompilerOf(project.settings->compiler).makeTools; }, "target"_ = target,
-      "compiler"_ = config.compilerText, "linker"_ = config.linkerText,
-      "libraries"_ = [&] { WriteLibraries(out, project); }, "includes"_ = Each(out, includes, "", writeInclude));
+        "tools"_([&] { out << CompilerOf(project.settings->compiler).makeTools; }), "target"_ = target,
+        "compiler"_ = config.compilerText, "linker"_ = config.linkerText,
+        "libraries"_([&] { WriteLibraries(out, project); }), "includes"_ = Each(out, includes, "", writeInclude));
 }
 
 void WriteTargetRule(TextWriter& out, const Project& project, std::string_view target) {

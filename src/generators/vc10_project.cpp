@@ -258,7 +258,7 @@ void ProjectWriter::WriteCompilerOption(const ProjectConfig& config, const std::
   if (FindProperty(kSignedFlags, property) || FindProperty(kFlags, property)) {
     m_xml.Value(ElementName(kCompilerElements, property), value);
   } else if (FindProperty(kEnumerated, property)) {
-    if (property == "ManagedExtensions") return;  // stands in the configuration group
+    if (property == "ManagedExtensions") return;  // in the configuration group
     const EnumeratedSwitch* row = FindValue(kEnumerated, property, value);
     if (row && !row->valueName.empty()) m_xml.Value(property, row->valueName);
   } else if (property == "AdditionalIncludeDirectories") {
@@ -312,7 +312,7 @@ void ProjectWriter::WriteLibrarianTool(const ProjectConfig& config) {
 void ProjectWriter::WriteLinkerTool(const ProjectConfig& config) {
   const XmlElement tool(m_xml, "Link");
   for (const auto& [property, value] : config.linkerOptions) {
-    if (property == "LinkIncremental" || property == "GenerateManifest") continue;  // stand with the outputs
+    if (property == "LinkIncremental" || property == "GenerateManifest") continue;  // written with the outputs
     if (const EnumeratedSwitch* row = FindValue(kLinkerEnumerated, property, value)) {
       if (row->valueName.empty()) {
         TraceWriter() << "VS2012 has no mapping for linker switch " << property << " = " << value << "\n";

@@ -47,8 +47,7 @@ void ProjectWriter::WriteAll() {
     }
   };
   WriteHeader();
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     # Begin Project
     # PROP AllowPerConfigDependencies 0
     # PROP Scc_ProjName ""
@@ -62,10 +61,10 @@ void ProjectWriter::WriteAll() {
     $target$
     # End Project
   )",
-      "configs"_ = writeConfigs, "target"_ = [this] { WriteTarget(); });
+        "configs"_ = writeConfigs, "target"_([this] { WriteTarget(); }));
 }
 
-// The configurations Release and Debug stand here whatever the project has.
+// The configurations Release and Debug are written whatever the project has.
 void ProjectWriter::WriteHeader() {
   Write(m_out, R"(
     # Microsoft Developer Studio Project File - Name="$name$" - Package Owner=<4>
@@ -100,8 +99,7 @@ void ProjectWriter::WriteConfig(const ProjectConfig& config) {
   const bool isDebug = config.name.find("Debug") != std::string::npos;
   const auto includes = IncludePaths(m_project, config, IsTranslatedForm(m_project, m_form));
   auto writeInclude = [this](const std::string& path) { m_out << " /I \"" << path << "\""; };
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     # PROP BASE Use_MFC 0
     # PROP BASE Use_Debug_Libraries $debug$
     # PROP BASE Output_Dir "$config$"
@@ -123,9 +121,9 @@ void ProjectWriter::WriteConfig(const ProjectConfig& config) {
     # ADD BSC32 /nologo
     $linker$
   )",
-      "debug"_ = int{isDebug}, "config"_ = config.name, "name"_ = m_name, "compiler"_ = config.compilerText,
-      "includes"_ = Each(m_out, includes, "", writeInclude), "define"_ = isDebug ? "_DEBUG" : "NDEGUG",  // (sic)
-      "linker"_ = [&] { WriteLinker(config); });
+        "debug"_ = int{isDebug}, "config"_ = config.name, "name"_ = m_name, "compiler"_ = config.compilerText,
+        "includes"_ = Each(m_out, includes, "", writeInclude), "define"_ = isDebug ? "_DEBUG" : "NDEGUG",  // (sic)
+        "linker"_([&] { WriteLinker(config); }));
 }
 
 void ProjectWriter::WriteLinker(const ProjectConfig& config) {
@@ -164,14 +162,13 @@ void ProjectWriter::WriteTarget() {
 // Paths are those of the folder tree and the display names.
 void ProjectWriter::WriteFolder(const ProjectFolder& folder, const std::string& prefix) {
   for (const auto& subfolder : folder.subfolders) {
-    Write(
-        m_out, R"(
+    Write(m_out, R"(
       # Begin Group "$name$"
       # PROP Default_Filter ""
       $content$
       # End Group
     )",
-        "name"_ = subfolder->name, "content"_ = [&] { WriteFolder(*subfolder, prefix + subfolder->name + "/"); });
+          "name"_ = subfolder->name, "content"_([&] { WriteFolder(*subfolder, prefix + subfolder->name + "/"); }));
   }
   for (const ProjectFile* file : folder.files) WriteFile(*file, prefix);
 }
@@ -230,8 +227,7 @@ void WriteVc6Workspace(TextWriter& out, const Workspace& workspace, Form form) {
   out << "Microsoft Developer Studio Workspace File, Format Version 6.00\n"
          "# WARNING: DO NOT EDIT OR DELETE THIS WORKSPACE FILE!\n\n";
   for (const auto& project : workspace.projects) {
-    Write(
-        out, R"(
+    Write(out, R"(
       ###############################################################################
 
       Project: "$name$"=./$prefix$$name$.dsp - Package Owner=<4>
@@ -246,8 +242,8 @@ void WriteVc6Workspace(TextWriter& out, const Workspace& workspace, Form form) {
       }}}
 
     )",
-        "name"_ = project->name, "prefix"_ = NamePrefix(FormOf(*project, form)),
-        "dependencies"_ = [&] { WriteDependencies(out, *project); });
+          "name"_ = project->name, "prefix"_ = NamePrefix(FormOf(*project, form)),
+          "dependencies"_([&] { WriteDependencies(out, *project); }));
   }
 }
 

@@ -123,7 +123,7 @@ void ProjectWriter::WriteEvent(const BuildEvent& event, std::string_view tool) {
 
 void ProjectWriter::WriteTools(const ProjectConfig& config) {
   OptionMap compilerOptions = config.compilerOptions;
-  compilerOptions.erase("UsePrecompiledHeader");  // stands at each source
+  compilerOptions.erase("UsePrecompiledHeader");  // written for each source
   compilerOptions.erase("ManagedExtensions");
   WriteTool("VCCLCompilerTool", compilerOptions, config);
   WriteTool("VCResourceCompilerTool", config.resourceOptions, config);

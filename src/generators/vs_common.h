@@ -11,7 +11,7 @@ namespace qrex {
 
 inline std::string ConfigSpec(const ProjectConfig& config) { return config.name + "|" + config.platform; }
 
-// What stands in an include property whose option value is `value`: the project's own directories ahead of its items,
+// The content of an include property whose option value is `value`: the project's own directories ahead of its items,
 // and for an item that begins with $(VIRTUAL_TREE) one entry for each root.
 std::string IncludeList(const Project& project, const ProjectConfig& config, std::string_view value, Form form);
 

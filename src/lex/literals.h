@@ -1,4 +1,4 @@
-// Numbers and quoted strings: how far a literal reaches, what it stands for, and the escapes in both directions.
+// Numbers and quoted strings: how far a literal reaches, its value, and the escapes in both directions.
 #pragma once
 
 #include <cstdint>
@@ -21,7 +21,7 @@ double FloatValue(const LexToken& token);
 void DecodeString(const LexToken& token, std::string& out);
 void ReadQuotedText(LexScanner& scanner, std::string& out);  // leaves the scanner on the closing quote
 
-char ByteOfEscape(char letter);  // the letter itself when it stands for nothing
+char ByteOfEscape(char letter);  // the letter itself when it is no escape
 void WriteEscapedChar(std::string& out, char c);
 void WriteCharLiteral(std::string& out, char c);     // 'c' with escapes
 std::string EscapedString(std::string_view text);    // each byte by WriteEscapedChar, no quotes

@@ -41,7 +41,7 @@ inline void SkipWord(LexScanner& scanner) {
   scanner.begin = EndOfWord(scanner.begin, scanner.end, ByteClassesOf(scanner.dialect));
 }
 
-// Behind a number of digits alone, of which the first stands at `at`; null when it may have another form.
+// Behind a number of digits alone, of which the first is at `at`; null when it may have another form.
 inline const char* EndOfDigits(const char* at, const char* end) {
   do ++at;
   while (at < end && ByteClassOf(*at) == kDigitByte);

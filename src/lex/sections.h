@@ -34,7 +34,7 @@ LexToken ReadArgumentOf(LexScanner& scanner, TextRange& argument, int32_t close,
   const char* const begin = scanner.begin;
   LexScanner ahead = scanner;  // copies: they stay in registers
   LexToken token;
-  int32_t nest = kNoToken;  // the opening bracket of the nest at hand
+  int32_t nest = kNoToken;  // the opening bracket of the nest being read
   for (int64_t depth = 0;;) {
     const char* const behind = ahead.begin;
     ReadTokenOf<dialect>(ahead, token);

@@ -83,7 +83,7 @@ void ExpansionContext::Scope() {
   ExpandBlock(block, child, indent, CurrentColumn());
 }
 
-// Python minds indentation: that of the first statement goes from every line, wherever the braces stand. Answers how
+// Python minds indentation: that of the first statement goes from every line, wherever the braces are. Answers how
 // many blank lines stood ahead of it.
 static size_t SkipToFirstStatement(TextRange& block, int& indent) {
   size_t lines = 0;
@@ -164,7 +164,7 @@ void ExpansionContext::For() {
   }
 }
 
-// For an error in a list: where the macro stands that holds it.
+// For an error in a list: where the macro is that holds it.
 std::string ExpansionContext::ListHint(const Loop& loop) const {
   LexScanner scanner(loop.list, m_scanner.dialect);
   const LexToken name = NextToken(scanner);

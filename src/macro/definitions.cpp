@@ -96,7 +96,7 @@ void ExpansionContext::DefineMacro(bool exported, bool naked, bool python) {
   AddMacro(std::move(macro), fileScope, exported);
 }
 
-// Behind the `(`; stands behind the `)` afterwards.
+// From behind the `(` to behind the `)`.
 void ExpansionContext::ReadFormals(LSMacroVariable& macro) {
   const std::string name = macro.name.Text();
   LexToken token = Next();

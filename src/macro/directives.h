@@ -1,4 +1,4 @@
-// The words behind `@`, and how each treats the line that it stands on.
+// The words behind `@`, and how each treats the line that it is on.
 #pragma once
 
 #include <string_view>
@@ -9,7 +9,7 @@ namespace qrex {
 
 struct Directive {
   enum class Line {
-    Kept,          // what stands ahead of it on its line goes out first: its output comes at that column
+    Kept,          // what is ahead of it on its line goes out first: its output comes at that column
     Dropped,       // the blanks ahead of it are dropped
     DroppedWhole,  // as well as the rest of its line: it leaves no trace
     OfItsOwn,      // nothing of either: it settles and drops by itself

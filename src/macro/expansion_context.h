@@ -78,7 +78,7 @@ class ExpansionContext {
   std::string ExpandPart(const TextRange& part, int64_t stripIndent = 0);  // in a child frame
   std::string ExpandExpression(const TextRange& part);                     // the same
   TextRange ReadExpressionText(bool openAlreadyRead);                      // in parentheses
-  // To the sink, as it stands.
+  // To the sink, unchanged.
   void CopySource(const TextRange& text, LineIndent indent, const TextRange* anchor);
   LexToken Next() { return NextToken(m_scanner); }
   LexToken RequireIdentifier(std::string_view message);  // fails with the message and the token

@@ -118,7 +118,7 @@ struct ExpressionGrammar {
     return holds ? whenTrue : whenFalse;
   }
 
-  // Precedence climbing: one call for all levels that stand without an operator.
+  // Precedence climbing: one call for all levels that have no operator.
   Literal Binary(int level) {
     Literal left = Unary();
     for (;;) {

@@ -13,7 +13,7 @@ class ExpressionParser : public ParserBase {
  public:
   void ParseExpression(Literal& out);  // a LiteralException becomes a LexScannerException at the current token
 
-  // One expression, converted. The parser stands behind it afterwards.
+  // One expression, converted. The parser is behind it afterwards.
   bool ReadBool(bool isExplicit = false);
   unsigned char ReadChar(bool isExplicit = false);
   int8_t ReadInt8(bool isExplicit = false);

@@ -171,7 +171,7 @@ LSFileFrame::LSFileFrame(MacroWorld& world) : LSFrame(world), m_index(world.file
 LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(m_world.fileFrames++) { m_fileFrame = this; }
 
 LSFileFrame::~LSFileFrame() {
-  // Not by the names of the variables: these may stand in the text of another file, which may be gone.
+  // Not by the names of the variables: these may be in the text of another file, which may be gone.
   for (std::string_view name : m_entered) m_world.definitions.Remove(name, m_index);
 }
 

@@ -152,7 +152,7 @@ class LSFrame {
 
 // The frame of a file. Every identifier of every text is looked up through all imports, so this must not cost time that
 // grows with their number: one table lists the definitions of each name in all file frames, and each frame keeps the
-// set of the frames that it sees. A name that stands nowhere is answered by one probe.
+// set of the frames that it sees. A name that is nowhere is answered by one probe.
 class LSFileFrame : public LSFrame {
  public:
   explicit LSFileFrame(MacroWorld& world);

@@ -1,4 +1,4 @@
-// What a name stands for: a value, a macro with its arguments, an argument that is called as a function, a Python
+// What a name means: a value, a macro with its arguments, an argument that is called as a function, a Python
 // macro.
 
 #include "lex/sections.h"
@@ -19,7 +19,7 @@ static std::shared_ptr<const BodyWords> FindWords(const TextRange& body, const N
       found->words.push_back({token.kind, static_cast<size_t>(token.text.begin - body.begin), token.text.Size()});
     }
     found->isComplete = true;
-  } catch (const LexScannerException&) {  // told where the call meets it
+  } catch (const LexScannerException&) {  // reported at the call
   }
   return found;
 }

@@ -52,7 +52,7 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   void SubstituteVariables(std::string& text) const;
   void ReadString(std::string& out);  // does not advance
   void ReadPath(std::string& out);    // does not advance
-  // Names and paths stand in quotes on the command lines of tools.
+  // Names and paths are put in quotes on the command lines of tools.
   static void RequireNoQuote(const std::string& name, const LexToken& token);
   void ReadStringOrExpression(std::string& out);  // advances
   void ReadNamedString(const std::string& name, std::string& out);
@@ -60,7 +60,7 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   bool ParseImportStatement();
   bool ParseVariableStatement(std::string* name = nullptr, std::string* value = nullptr);
 
-  // Expands the text of a file that stands in the context already; false after an error, which is reported.
+  // Expands the text of a file that the context has already; false after an error, which is reported.
   bool ExpandSourceFile(MpfwSourceFile& file);
 
  protected:
@@ -78,7 +78,7 @@ class MpfwParser : public ExpressionParser, public ImportHandler {
   int m_importDepth = 0;
   std::vector<std::string> m_imports;  // under expansion, outermost first
   bool m_isTooDeep = false, m_isTooDeepTold = false;
-  const char* m_importBegin = nullptr;  // the `@` of the import statement at hand
+  const char* m_importBegin = nullptr;  // the `@` of the import statement being read
 };
 
 }  // namespace qrex

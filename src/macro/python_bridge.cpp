@@ -1,17 +1,14 @@
 #include "macro/python_bridge.h"
 
-#include <algorithm>
-#include <cstdio>
-#include <cstdlib>
 #include <memory>
 
 #include "lex/scanner.h"
 #include "macro/python_library.h"
 #include "platform/console.h"
 #include "platform/dynamic_library.h"
+#include "platform/python_places.h"
 #include "platform/system.h"
 #include "text/exceptions.h"
-#include "text/files.h"
 #include "text/text_writer.h"
 #include "text/trace.h"
 
@@ -98,13 +95,12 @@ void InitialiseStreamHooks() {
 }
 
 // The standard library lies beside the shared library. Without this Python would look for it along PATH, where another
-// version may stand first.
+// version may come first.
 void SetPythonHome() {
   static std::string home;  // Python keeps the pointer
-  if (std::getenv("PYTHONHOME")) return;
-  home = platform::LibraryPathOf(reinterpret_cast<const void*>(py.Py_InitializeEx));
-  for (int i = 0; i < 2; ++i) home.erase(std::min(home.rfind('/'), home.size()));
-  if (!home.empty() && FileExists(home + "/lib/python2.7/os.py")) py.Py_SetPythonHome(home.data());
+  if (platform::EnvironmentValue("PYTHONHOME")) return;
+  home = platform::PythonHomeOf(platform::LibraryPathOf(reinterpret_cast<const void*>(py.Py_InitializeEx)));
+  if (!home.empty()) py.Py_SetPythonHome(home.data());
 }
 
 bool StartPython(std::string& error) {
@@ -216,7 +212,7 @@ void WritePythonValue(TextWriter& writer, Object* object, const char* position, 
 struct PythonScope {
   PythonScope() { platform::FlushStdout(); }
   ~PythonScope() {
-    std::fflush(nullptr);
+    platform::FlushAllStreams();
     folder.Return();
   }
   const platform::WorkingFolder folder;

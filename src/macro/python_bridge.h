@@ -1,9 +1,9 @@
 // The embedded Python 2.7 interpreter behind @defpython and @runpython. It is loaded and started when one of them first
 // needs it and never shut down, so that a run without them needs no Python. All code runs in the dictionary of
-// `__main__`: a name that one block sets stands in all later ones, in any file of the run.
+// `__main__`: a name that one block sets is known to all later ones, in any file of the run.
 //
 // The library is the one that the environment variable QREX_PYTHON names, and only that; without it the one found when
-// the tool was built, then libpython2.7.so.1.0 where the system keeps libraries.
+// the tool was built, then the system's own.
 //
 // Failures are LexScannerExceptions at `position`, with Python's traceback in the message.
 #pragma once

@@ -1,21 +1,23 @@
 #include "macro/python_library.h"
 
-#include <cstdlib>
+#include <optional>
 #include <vector>
 
 #include "platform/dynamic_library.h"
+#include "platform/python_places.h"
+#include "platform/system.h"
 
 namespace qrex::python {
 
 namespace {
 
 std::vector<std::string> Candidates() {
-  if (const char* named = std::getenv("QREX_PYTHON")) return {named};
+  if (const std::optional<std::string> named = platform::EnvironmentValue("QREX_PYTHON")) return {*named};
   std::vector<std::string> candidates;
 #ifdef QREX_PYTHON_LIBRARY
   candidates.push_back(QREX_PYTHON_LIBRARY);
 #endif
-  candidates.push_back("libpython2.7.so.1.0");
+  candidates.push_back(platform::PythonLibraryName());
   return candidates;
 }
 

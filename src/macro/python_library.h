@@ -1,5 +1,5 @@
 // The part of Python 2.7's embedding interface that the bridge uses. The library is opened at run time, so the few
-// layouts and constants that its headers would give stand here, as a 64-bit release build of Python 2.7 has them.
+// layouts and constants that its headers would give are here, as a 64-bit release build of Python 2.7 has them.
 #pragma once
 
 #include <cstdint>

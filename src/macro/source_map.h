@@ -88,7 +88,7 @@ bool IsAddedText(const SourceFileList& files, const char* position);
 // With its hint behind it, also on whether the place was added to the file by the command line.
 void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception);
 
-// The column at which the lines of an expansion begin. Most expansions stand within a line, so that it is kept as a
+// The column at which the lines of an expansion begin. Most expansions are within a line, so that it is kept as a
 // place in the output and worked out when a line does begin.
 class LineIndent {
  public:

@@ -8,6 +8,7 @@
 #include <boost/locale/utf.hpp>
 #include <cerrno>
 #include <chrono>
+#include <cstdio>
 
 namespace qrex::platform {
 
@@ -92,6 +93,8 @@ void FlushStdout() {
   buffered.clear();
   lastWrite = Clock::now();
 }
+
+void FlushAllStreams() { std::fflush(nullptr); }
 
 void WriteStdout(std::string_view bytes) {
   if (!isBuffered) return WriteAtOnce(bytes);

@@ -17,5 +17,6 @@ void WriteStdout(std::string_view bytes);  // at once, unless buffered; what can
 // write to the same output (commands, Python) come after FlushStdout, and so does the end of the process.
 void BufferStdout();
 void FlushStdout();
+void FlushAllStreams();  // of the C library, into which others in this process write, such as Python
 
 }  // namespace qrex::platform

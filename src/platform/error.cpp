@@ -6,8 +6,6 @@ namespace qrex::platform {
 
 namespace {
 
-thread_local uint32_t ownError = 0;  // set by this layer; else errno counts
-
 struct Mapping {
   int number;
   uint32_t code;
@@ -35,17 +33,19 @@ constexpr Sentence kSentences[] = {
     {223, "The file size exceeds the limit allowed and cannot be saved."},
 };
 
-}  // namespace
-
-uint32_t LastError() {
-  if (ownError != 0) return ownError;
+uint32_t CodeOf(int error) {
   for (const Mapping& mapping : kMappings) {
-    if (mapping.number == errno) return mapping.code;
+    if (mapping.number == error) return mapping.code;
   }
   return kGeneralFailure;
 }
 
-void SetLastError(uint32_t code) { ownError = code; }
+}  // namespace
+
+Result Result::OfSystem(int error) { return error == 0 ? Result() : Failure(CodeOf(error)); }
+Result Result::OfCall(bool isWell) { return isWell ? Result() : Failure(LastError()); }
+
+uint32_t LastError() { return CodeOf(errno); }
 
 bool ErrorSentence(uint32_t code, std::string& text) {
   for (const Sentence& sentence : kSentences) {

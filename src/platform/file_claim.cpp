@@ -7,8 +7,6 @@
 
 #include <cerrno>
 
-#include "platform/error.h"
-
 namespace qrex::platform {
 
 FileClaim::~FileClaim() {
@@ -16,17 +14,15 @@ FileClaim::~FileClaim() {
 }
 
 // Between the two calls a sweep may have locked and removed it.
-bool FileClaim::Make(const std::string& path) {
-  SetLastError(0);
+Result FileClaim::Make(const std::string& path) {
   m_descriptor = open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
-  if (m_descriptor < 0) return false;
+  if (m_descriptor < 0) return Result::OfCall(false);
   const bool isTaken = flock(m_descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
   struct stat status;
-  if (!isTaken && (fstat(m_descriptor, &status) != 0 || status.st_nlink > 0)) return true;
+  if (!isTaken && (fstat(m_descriptor, &status) != 0 || status.st_nlink > 0)) return {};
   close(m_descriptor);
   m_descriptor = -1;
-  errno = EEXIST;
-  return false;
+  return Result::Failure(kErrorFileExists);
 }
 
 void FileClaim::RemoveAbandoned(const std::string& path) {

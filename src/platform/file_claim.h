@@ -4,6 +4,8 @@
 
 #include <string>
 
+#include "platform/error.h"
+
 namespace qrex::platform {
 
 class FileClaim {
@@ -13,9 +15,9 @@ class FileClaim {
   FileClaim(const FileClaim&) = delete;
   FileClaim& operator=(const FileClaim&) = delete;
 
-  // Makes the file, which must not be there, and holds it to the end of this object. Failures leave their code in
-  // LastError; 80 (the file exists): another name has to be tried.
-  bool Make(const std::string& path);
+  // Makes the file, which must not be there, and holds it to the end of this object. kErrorFileExists: another name
+  // has to be tried.
+  Result Make(const std::string& path);
   // Removes a file that nobody holds. Where the file system has no locks, none.
   static void RemoveAbandoned(const std::string& path);
 

@@ -11,8 +11,7 @@
 #include <cerrno>
 #include <cstdio>
 #include <ctime>
-
-#include "platform/error.h"
+#include <filesystem>
 
 namespace qrex::platform {
 
@@ -51,20 +50,15 @@ class Descriptor {
   int m_number;
 };
 
-bool RefuseReadOnly(const std::string& path) {
-  SetLastError(0);
-  if (!IsReadOnlyFile(path)) return false;
-  SetLastError(kErrorAccessDenied);
-  return true;
-}
+Result Refused() { return Result::Failure(kErrorAccessDenied); }
 
 }  // namespace
 
 void PreferLargePages(void* memory, size_t size) {
   constexpr uintptr_t kPage = 4096;
   if (size < kLargePage) return;
-  const uintptr_t begin = reinterpret_cast<uintptr_t>(memory) / kPage * kPage + kPage;
-  madvise(reinterpret_cast<void*>(begin), size - kPage, MADV_HUGEPAGE);
+  char* const nextPage = static_cast<char*>(memory) + (kPage - reinterpret_cast<uintptr_t>(memory) % kPage);
+  madvise(nextPage, size - kPage, MADV_HUGEPAGE);
 }
 
 void ReserveText(std::string& text, size_t size) {
@@ -73,10 +67,9 @@ void ReserveText(std::string& text, size_t size) {
   PreferLargePages(text.data(), size);
 }
 
-bool Stat(const std::string& path, FileInfo& info) {
-  SetLastError(0);
+Result Stat(const std::string& path, FileInfo& info) {
   struct stat status;
-  if (stat(path.c_str(), &status) != 0) return false;
+  if (stat(path.c_str(), &status) != 0) return Result::OfCall(false);
   info.isDirectory = S_ISDIR(status.st_mode);
   info.isPlain = S_ISREG(status.st_mode);
   info.isReadOnly = (status.st_mode & kWriteBits) == 0;
@@ -86,7 +79,7 @@ bool Stat(const std::string& path, FileInfo& info) {
   info.size = static_cast<uint64_t>(status.st_size);
   info.name = path.substr(path.rfind('/') + 1);
   info.isHidden = !info.name.empty() && info.name.front() == '.';
-  return true;
+  return {};
 }
 
 int64_t CurrentStamp() {
@@ -119,25 +112,16 @@ bool IsReadOnlyFile(const std::string& path) {
 }
 
 bool IsLink(const std::string& path) {
-  SetLastError(0);
   struct stat status;
   return lstat(path.c_str(), &status) == 0 && IsLink(status);
 }
 
-bool ReadFile(const std::string& path, std::string& content, Readable kind) {
-  SetLastError(0);
+Result ReadFile(const std::string& path, std::string& content, Readable kind) {
   const bool plainOnly = kind == Readable::PlainFile;
   Descriptor file(path, O_RDONLY | (plainOnly ? O_NONBLOCK : 0));  // the open itself may wait for a pipe's writer
   struct stat status;
-  if (!file || fstat(file.Number(), &status) != 0) return false;
-  if (S_ISDIR(status.st_mode)) {
-    errno = EISDIR;
-    return false;
-  }
-  if (plainOnly && !S_ISREG(status.st_mode)) {
-    errno = EACCES;
-    return false;
-  }
+  if (!file || fstat(file.Number(), &status) != 0) return Result::OfCall(false);
+  if (S_ISDIR(status.st_mode) || (plainOnly && !S_ISREG(status.st_mode))) return Refused();
   // A file of the proc file system has no size, and one that grows has more: read to the end. Less than the size is a
   // fault, not the end.
   const size_t size = static_cast<size_t>(status.st_size);
@@ -147,128 +131,115 @@ bool ReadFile(const std::string& path, std::string& content, Readable kind) {
   for (;;) {
     const ssize_t got = read(file.Number(), block, sizeof block);
     if (got < 0 && errno == EINTR) continue;
-    if (got < 0) return false;
+    if (got < 0) return Result::OfCall(false);
     content.append(block, static_cast<size_t>(got));
-    if (got > 0 && content.size() == size) return true;
+    if (got > 0 && content.size() == size) return {};
     if (got > 0) continue;
-    if (content.size() < size) errno = EIO;
-    return content.size() >= size;
+    return Result::OfSystem(content.size() < size ? EIO : 0);
   }
 }
 
-bool WriteFile(const std::string& path, std::string_view content) {
-  SetLastError(0);
+Result WriteFile(const std::string& path, std::string_view content) {
   Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC);
-  if (!file) return false;
+  if (!file) return Result::OfCall(false);
   while (!content.empty()) {
     const ssize_t written = write(file.Number(), content.data(), content.size());
     if (written < 0 && errno == EINTR) continue;
-    if (written < 0) return false;
+    if (written < 0) return Result::OfCall(false);
     content.remove_prefix(static_cast<size_t>(written));
   }
-  return file.Close();
+  return Result::OfCall(file.Close());
 }
 
-bool MakeEmptyFile(const std::string& path, bool keepExisting) {
-  if (RefuseReadOnly(path)) return false;
-  return static_cast<bool>(Descriptor(path, O_WRONLY | O_CREAT | (keepExisting ? 0 : O_EXCL)));
+Result MakeEmptyFile(const std::string& path, bool keepExisting) {
+  if (IsReadOnlyFile(path)) return Refused();
+  const Descriptor file(path, O_WRONLY | O_CREAT | (keepExisting ? 0 : O_EXCL));
+  return Result::OfCall(static_cast<bool>(file));
 }
 
-bool RemoveFile(const std::string& path) {
-  if (!IsLink(path) && RefuseReadOnly(path)) return false;
-  return unlink(path.c_str()) == 0;
+Result RemoveFile(const std::string& path) {
+  if (!IsLink(path) && IsReadOnlyFile(path)) return Refused();
+  return Result::OfCall(unlink(path.c_str()) == 0);
 }
 
-bool RemoveTree(const std::string& path) {
+Result RemoveTree(const std::string& path) {
   boost::system::error_code error;
-  SetLastError(0);
   boost::filesystem::remove_all(path, error);
-  errno = error.value();
-  return !error;
+  return Result::OfSystem(error.value());
 }
 
-bool RenameFile(const std::string& from, const std::string& to) {
-  SetLastError(0);
-  return std::rename(from.c_str(), to.c_str()) == 0;
+Result RenameFile(const std::string& from, const std::string& to) {
+  return Result::OfCall(std::rename(from.c_str(), to.c_str()) == 0);
 }
 
-bool MakeDirectory(const std::string& path) {
-  SetLastError(0);
-  return mkdir(path.c_str(), 0777) == 0;
-}
+Result MakeDirectory(const std::string& path) { return Result::OfCall(mkdir(path.c_str(), 0777) == 0); }
 
-bool SetReadOnlyAttribute(const std::string& path, bool readOnly) {
-  SetLastError(0);
+Result SetReadOnlyAttribute(const std::string& path, bool readOnly) {
   struct stat status;
-  if (lstat(path.c_str(), &status) != 0) return false;
-  if (IsLink(status)) return true;
-  if (((status.st_mode & kWriteBits) == 0) == readOnly) return true;
-  return chmod(path.c_str(), readOnly ? status.st_mode & ~kWriteBits : status.st_mode | S_IWUSR) == 0;
+  if (lstat(path.c_str(), &status) != 0) return Result::OfCall(false);
+  if (IsLink(status) || ((status.st_mode & kWriteBits) == 0) == readOnly) return {};
+  const mode_t mode = readOnly ? status.st_mode & ~kWriteBits : status.st_mode | S_IWUSR;
+  return Result::OfCall(chmod(path.c_str(), mode) == 0);
 }
 
-bool CopyExecuteBits(const std::string& from, const std::string& to) {
+Result CopyExecuteBits(const std::string& from, const std::string& to) {
   constexpr mode_t kExecuteBits = S_IXUSR | S_IXGRP | S_IXOTH;
-  SetLastError(0);
   struct stat source, target;
-  if (stat(from.c_str(), &source) != 0 || stat(to.c_str(), &target) != 0) return false;
+  if (stat(from.c_str(), &source) != 0 || stat(to.c_str(), &target) != 0) return Result::OfCall(false);
   const mode_t bits = source.st_mode & kExecuteBits;
-  return bits == 0 || chmod(to.c_str(), (target.st_mode | bits) & 07777) == 0;
+  return Result::OfCall(bits == 0 || chmod(to.c_str(), (target.st_mode | bits) & 07777) == 0);
 }
 
-bool StampNow(const std::string& path) {
-  SetLastError(0);
-  return utimensat(AT_FDCWD, path.c_str(), nullptr, 0) == 0;
-}
+Result StampNow(const std::string& path) { return Result::OfCall(utimensat(AT_FDCWD, path.c_str(), nullptr, 0) == 0); }
 
-bool SetWriteTime(const std::string& path, int64_t time) {
-  SetLastError(0);
+Result SetWriteTime(const std::string& path, int64_t time) {
   const int64_t sinceEpoch = time - kUnixEpoch;
   const timespec stamp{sinceEpoch / kUnitsOfSecond, sinceEpoch % kUnitsOfSecond * 100};
   const timespec times[2] = {stamp, stamp};
-  return utimensat(AT_FDCWD, path.c_str(), times, 0) == 0;
+  return Result::OfCall(utimensat(AT_FDCWD, path.c_str(), times, 0) == 0);
 }
 
-bool FullPath(const std::string& path, std::string& out) {
+Result FullPath(const std::string& path, std::string& out) {
   boost::system::error_code error;
   const boost::filesystem::path full = boost::filesystem::absolute(path, error);
-  if (path.empty() || error) return false;
+  if (path.empty() || error) return Result::Failure(kErrorFileNotFound);
   out = full.lexically_normal().generic_string();
   if (out.size() > 2 && out.compare(out.size() - 2, 2, "/.") == 0) out.resize(out.size() - 2);
   if (out.size() > 1 && out.back() == '/') out.pop_back();
-  return true;
+  return {};
 }
 
-bool RealPath(const std::string& path, std::string& out) {
+std::string CollapseDots(std::string_view path) {
+  return std::filesystem::path(path).lexically_normal().generic_string();
+}
+
+Result RealPath(const std::string& path, std::string& out) {
   boost::system::error_code error;
-  SetLastError(0);
   out = boost::filesystem::canonical(path, error).generic_string();
-  errno = error.value();
-  return !error;
+  return Result::OfSystem(error.value());
 }
 
 namespace {
 
-// False when the directory could not be listed to its end.
+// A failure also when the directory could not be listed to its end.
 template <typename Take>
-bool ForEachEntry(const std::string& directory, Take take) {
-  SetLastError(0);
+Result ForEachEntry(const std::string& directory, Take take) {
   DIR* handle = opendir(directory.empty() ? "." : directory.c_str());
-  if (!handle) return false;
+  if (!handle) return Result::OfCall(false);
   errno = 0;
   while (const dirent* entry = readdir(handle)) {
     take(*entry);
     errno = 0;
   }
-  const int failure = errno;
+  const Result listed = Result::OfSystem(errno);
   closedir(handle);
-  errno = failure;
-  return failure == 0;
+  return listed;
 }
 
 }  // namespace
 
-bool EntryNames(const std::string& directory, std::vector<std::string>& names) {
-  const bool listed = ForEachEntry(directory, [&](const dirent& entry) { names.emplace_back(entry.d_name); });
+Result EntryNames(const std::string& directory, std::vector<std::string>& names) {
+  const Result listed = ForEachEntry(directory, [&](const dirent& entry) { names.emplace_back(entry.d_name); });
   std::sort(names.begin(), names.end());
   return listed;
 }

@@ -1,4 +1,4 @@
-// Files as the system below gives them. Failures leave their code in LastError.
+// Files as the system below gives them.
 //
 // The read-only attribute is "no write permission bit is set". A read-only file refuses to be opened for writing also
 // for the superuser, whom the permission bits would not stop.
@@ -9,6 +9,8 @@
 #include <string>
 #include <string_view>
 #include <vector>
+
+#include "platform/error.h"
 
 namespace qrex::platform {
 
@@ -26,7 +28,7 @@ struct FileInfo {
   std::string name;
 };
 
-bool Stat(const std::string& path, FileInfo& info);
+Result Stat(const std::string& path, FileInfo& info);
 // The stamp that a file gets which is written now: the clock of stamps moves in ticks, behind that of the system.
 int64_t CurrentStamp();
 
@@ -51,23 +53,24 @@ bool IsReadOnlyFile(const std::string& path);
 bool IsLink(const std::string& path);
 // A pipe or device is read to its end, which may be waited for without end, only where the caller asks for it.
 enum class Readable { PlainFile, AnyFile };
-bool ReadFile(const std::string& path, std::string& content, Readable kind = Readable::PlainFile);
+Result ReadFile(const std::string& path, std::string& content, Readable kind = Readable::PlainFile);
 // Memory that is about to be filled is had faster in large pages. No more than a hint.
 void PreferLargePages(void* memory, size_t size);
-void ReserveText(std::string& text, size_t size);                   // as reserve, in large pages where it is large
-bool WriteFile(const std::string& path, std::string_view content);  // in place of what stands there, read-only or not
-bool MakeEmptyFile(const std::string& path, bool keepExisting);
-bool RemoveFile(const std::string& path);  // of a link, the name alone
-bool RemoveTree(const std::string& path);  // true also where there is none
-bool RenameFile(const std::string& from, const std::string& to);
-bool MakeDirectory(const std::string& path);
-bool SetReadOnlyAttribute(const std::string& path, bool readOnly);  // a link is left alone
-bool StampNow(const std::string& path);
-bool SetWriteTime(const std::string& path, int64_t time);
-bool CopyExecuteBits(const std::string& from, const std::string& to);
-bool FullPath(const std::string& path, std::string& out);
-bool RealPath(const std::string& path, std::string& out);                        // with symbolic links resolved
-bool EntryNames(const std::string& directory, std::vector<std::string>& names);  // with "." and "..", in byte order
-std::vector<std::string> PlainFileNames(const std::string& directory);           // plain files alone, in no order
+void ReserveText(std::string& text, size_t size);                     // as reserve, in large pages where it is large
+Result WriteFile(const std::string& path, std::string_view content);  // in place of what is there, read-only or not
+Result MakeEmptyFile(const std::string& path, bool keepExisting);
+Result RemoveFile(const std::string& path);  // of a link, the name alone
+Result RemoveTree(const std::string& path);  // well also where there is none
+Result RenameFile(const std::string& from, const std::string& to);
+Result MakeDirectory(const std::string& path);
+Result SetReadOnlyAttribute(const std::string& path, bool readOnly);  // a link is left alone
+Result StampNow(const std::string& path);
+Result SetWriteTime(const std::string& path, int64_t time);
+Result CopyExecuteBits(const std::string& from, const std::string& to);
+Result FullPath(const std::string& path, std::string& out);
+std::string CollapseDots(std::string_view path);                                   // of its text alone
+Result RealPath(const std::string& path, std::string& out);                        // with symbolic links resolved
+Result EntryNames(const std::string& directory, std::vector<std::string>& names);  // with "." and "..", in byte order
+std::vector<std::string> PlainFileNames(const std::string& directory);             // plain files alone, in no order
 
 }  // namespace qrex::platform

@@ -82,15 +82,17 @@ std::array<uint8_t, 16> MakeUuid() {
 
 namespace {
 
-bool IsOnPath(const std::string& program) {
-  const char* path = std::getenv("PATH");
-  std::string_view rest = path ? path : "";
+// The file that a name on PATH stands for; empty: none.
+std::string PathOnPath(const std::string& program) {
+  const std::string path = EnvironmentValue("PATH").value_or("");
+  std::string_view rest = path;
   while (!rest.empty()) {
     const size_t end = std::min(rest.find(kPathListSeparator), rest.size());
-    if (access((std::string(rest.substr(0, end)) + "/" + program).c_str(), X_OK) == 0) return true;
+    std::string candidate = std::string(rest.substr(0, end)) + "/" + program;
+    if (access(candidate.c_str(), X_OK) == 0) return candidate;
     rest.remove_prefix(std::min(end + 1, rest.size()));
   }
-  return false;
+  return {};
 }
 
 // The batch file that marks a manifest's update is the one that this system has to carry out:
@@ -158,13 +160,33 @@ int RunCommand(ToolKeeper& tools, const std::string& line) {
   constexpr std::string_view kBatchEnd = ".bat\"";
   std::string command =
       line.compare(0, kInterpreter.size(), kInterpreter) == 0 ? line.substr(kInterpreter.size()) : line;
-  if (command.compare(0, kCompiler.size(), kCompiler) == 0 && !IsOnPath("gcc-4")) command.erase(3, 2);
+  if (command.compare(0, kCompiler.size(), kCompiler) == 0 && PathOnPath("gcc-4").empty()) command.erase(3, 2);
   if (command.size() > kBatchEnd.size() + 1 && command.front() == '"' &&
       command.compare(command.size() - kBatchEnd.size(), kBatchEnd.size(), kBatchEnd) == 0) {
     return RunBatchFile(command.substr(1, command.size() - 2));
   }
   FlushStdout();
   return tools.Run(ForShell(command));
+}
+
+NoInterpreter WhyNoInterpreter() {
+  switch (errno) {
+    case ENOENT:
+      return NoInterpreter::NotFound;
+    case E2BIG:
+      return NoInterpreter::LineTooLong;
+    case ENOEXEC:
+      return NoInterpreter::NotAProgram;
+    case ENOMEM:
+      return NoInterpreter::NoMemory;
+    default:
+      return NoInterpreter::OtherCause;
+  }
+}
+
+std::optional<std::string> EnvironmentValue(const char* name) {
+  const char* const value = std::getenv(name);
+  return value ? std::optional<std::string>(value) : std::nullopt;
 }
 
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
@@ -177,10 +199,17 @@ WorkingFolder::~WorkingFolder() {
 
 void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(m_descriptor); }
 
-std::string ProgramPath() {
+std::string FindProgram(const std::string& calledAs) {
+  const std::string found = calledAs.find('/') == std::string::npos ? PathOnPath(calledAs) : calledAs;
+  std::string path;
+  return !found.empty() && RealPath(found, path) ? path : std::string();
+}
+
+std::string ProgramPath(const std::string& calledAs) {
   std::string path(PATH_MAX, '\0');
   const ssize_t length = readlink("/proc/self/exe", path.data(), path.size());
-  path.resize(length > 0 ? static_cast<size_t>(length) : 0);
+  if (length <= 0) return FindProgram(calledAs);
+  path.resize(static_cast<size_t>(length));
   return path;
 }
 
@@ -232,12 +261,12 @@ bool RunOnStack(size_t bytes, const std::function<void()>& body) {
     std::exception_ptr failure;
   } run{body, stack, nullptr};
   const auto start = [](void* argument) -> void* {
-    Run& run = *static_cast<Run*>(argument);
-    stackBegin = reinterpret_cast<uintptr_t>(run.stack) + kGuard;
+    Run& self = *static_cast<Run*>(argument);
+    stackBegin = reinterpret_cast<uintptr_t>(self.stack) + kGuard;
     try {
-      run.body();
+      self.body();
     } catch (...) {
-      run.failure = std::current_exception();
+      self.failure = std::current_exception();
     }
     return nullptr;
   };
@@ -259,7 +288,7 @@ bool IsStackShort() {
 
 void SetSignals() {
   std::signal(SIGXFSZ, [](int) {});  // a handler, since tools would inherit that the signal is ignored
-  std::signal(SIGCHLD, SIG_DFL);     // who ignores it, also by inheritance, is not told how its tools ended
+  std::signal(SIGCHLD, SIG_DFL);     // who ignores it, also by inheritance, does not learn how its tools ended
 }
 
 // The heap begins with a step that holds most runs, in large pages: to be given memory page by page took up to half of

@@ -4,6 +4,7 @@
 #include <array>
 #include <cstdint>
 #include <functional>
+#include <optional>
 #include <string>
 
 namespace qrex::platform {
@@ -16,10 +17,14 @@ uint64_t PerformanceFrequency();  // counts per second
 
 std::array<uint8_t, 16> MakeUuid();  // random, in network byte order
 
-// Runs a line through the command interpreter; its exit code. "cmd /c REST" runs REST. The line has the form of that
-// interpreter: "..." is taken as it stands, and outside of it 1>FILE, 2>FILE and 2>&1 redirect; nothing else has a
+// Runs a line through the command interpreter; its exit code, or -1. "cmd /c REST" runs REST. The line has the form of
+// that interpreter: "..." is taken literally, and outside of it 1>FILE, 2>FILE and 2>&1 redirect; nothing else has a
 // meaning, so that a line runs the one tool that it begins with.
 int RunCommand(ToolKeeper& tools, const std::string& line);
+// Why RunCommand, just now, gave -1.
+enum class NoInterpreter { NotFound, LineTooLong, NotAProgram, NoMemory, OtherCause };
+NoInterpreter WhyNoInterpreter();
+std::optional<std::string> EnvironmentValue(const char* name);
 void SetEnvironment(const std::string& name, const std::string& value);
 constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
 
@@ -36,7 +41,10 @@ class WorkingFolder {
   const int m_descriptor;
 };
 
-std::string ProgramPath();  // of this program, with symbolic links resolved; empty where the system does not tell
+// Of this program, with symbolic links resolved. Where the system does not tell, it is found by the first word of its
+// command line: a path, or a name on PATH; empty: not found.
+std::string ProgramPath(const std::string& calledAs);
+std::string FindProgram(const std::string& calledAs);  // by that word alone
 uint64_t CurrentThreadId();
 bool IsProcessRunning(uint64_t id);
 struct LocalTime {
@@ -50,7 +58,7 @@ bool RunOnStack(size_t bytes, const std::function<void()>& body);
 // Whether that stack may not hold another level of what is nested. What recurses as deep as its input asks here.
 bool IsStackShort();
 // From now on a write beyond the user's limit of file sizes fails, where it would end the process, and the ends of
-// tools are told.
+// tools are reported to it.
 void SetSignals();
 void TuneHeap();  // for a short run that fills much memory: take it in large steps
 

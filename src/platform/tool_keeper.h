@@ -4,7 +4,7 @@
 //
 // Why not give the lock to the tools: what they leave running for good (the server of a compiler cache) would hold it
 // for good. Such a server leaves the session of its terminal; by that the keeper knows what it must leave alone.
-// The keeper stands in a process group of its own, the tools in that of this process: what a terminal or a script sends
+// The keeper is in a process group of its own, the tools in that of this process: what a terminal or a script sends
 // to the group reaches the tools as ever, and not the keeper, even if it cannot be caught.
 #pragma once
 

@@ -2,7 +2,6 @@
 
 #include <functional>
 
-#include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
 #include "text/exceptions.h"
@@ -21,7 +20,7 @@ std::string RandomMark() {
   return mark.append(kEnd);
 }
 
-// Where the name would be too long, a number stands for the file's.
+// Where the name would be too long, a number replaces the file's.
 std::string NameBeside(const std::string& path) {
   const std::string folder = path.substr(0, path.rfind('/') + 1);
   const std::string name = path.substr(folder.size()), mark = RandomMark();
@@ -32,12 +31,12 @@ std::string NameBeside(const std::string& path) {
 }  // namespace
 
 BesideFile::BesideFile(const std::string& path) {
-  constexpr uint32_t kFileExists = 80;
+  platform::Result made;
   do {
     m_path = NameBeside(path);
-    if (m_claim.Make(m_path)) return;
-  } while (platform::LastError() == kFileExists);
-  throw FileException(path);
+    made = m_claim.Make(m_path);
+  } while (made.Code() == platform::kErrorFileExists);
+  Require(made, path);
 }
 
 bool BesideFile::IsNameOfOne(std::string_view name) {

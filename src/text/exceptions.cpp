@@ -1,7 +1,5 @@
 #include "text/exceptions.h"
 
-#include "platform/error.h"
-
 namespace qrex {
 
 std::string ExceptionText(const IException& exception) {
@@ -16,16 +14,20 @@ std::string SystemErrorText(uint32_t code) {
   return text;
 }
 
-void ReportSystemError(const SystemException& exception) {
+void ReportSystemError(uint32_t code) {
   std::string text;
-  if (platform::ErrorSentence(exception.errorCode, text)) {
-    TraceWriter() << "ERROR : GetLastError() returned " << exception.errorCode << " : " << text << "\n";
+  if (platform::ErrorSentence(code, text)) {
+    TraceWriter() << "ERROR : GetLastError() returned " << code << " : " << text << "\n";
   } else {
-    TraceWriter() << "ERROR: FormatMessage() failed   GetLastError returned " << exception.errorCode << "\n";
+    TraceWriter() << "ERROR: FormatMessage() failed   GetLastError returned " << code << "\n";
   }
 }
 
 SystemException::SystemException() : errorCode(platform::LastError()) {}
+
+void Require(platform::Result result, const std::string& path) {
+  if (!result) throw FileException(result.Code(), path);
+}
 
 void ExceptionBase::Write(TextWriter& writer) const { writer << message; }
 void LiteralException::Write(TextWriter& writer) const { writer << message; }

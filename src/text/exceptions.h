@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <string>
 
+#include "platform/error.h"
 #include "text/text_writer.h"
 
 namespace qrex {
@@ -39,7 +40,7 @@ class SystemException : public IException {
   uint32_t errorCode;
 };
 
-void ReportSystemError(const SystemException& exception);  // a line of the trace log with the code and its sentence
+void ReportSystemError(uint32_t code);  // a line of the trace log with the code and its sentence
 
 class FileException : public SystemException {
  public:
@@ -48,6 +49,8 @@ class FileException : public SystemException {
   void Write(TextWriter& writer) const override;
   std::string path;
 };
+
+void Require(platform::Result result, const std::string& path);  // raises FileException when it is a failure
 
 class LiteralException : public IException {
  public:

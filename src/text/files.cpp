@@ -7,7 +7,6 @@
 #include <thread>
 
 #include "platform/console.h"
-#include "platform/error.h"
 #include "platform/file_system.h"
 #include "platform/system.h"
 #include "text/beside_file.h"
@@ -43,7 +42,7 @@ uint32_t Crc32(std::string_view bytes) {
 
 bool FileExists(const std::string& path) { return platform::CanRead(Checked(path)); }
 
-bool DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }
+platform::Result DeleteFile(const std::string& path) { return platform::RemoveFile(Checked(path)); }
 
 namespace {
 
@@ -58,40 +57,37 @@ template <typename Finish>
 void WriteBesideAndRename(const std::string& path, std::string_view content, Finish finish) {
   const BesideFile claim(path);
   const std::string& beside = claim.Path();
-  if (platform::WriteFile(beside, content) && finish(beside) && platform::RenameFile(beside, path)) return;
-  const uint32_t code = platform::LastError();
-  RemoveBeside(beside);
-  throw FileException(code, path);
+  platform::Result result = platform::WriteFile(beside, content);
+  if (result) result = finish(beside);
+  if (result) result = platform::RenameFile(beside, path);
+  if (!result) RemoveBeside(beside);
+  Require(result, path);
 }
 
 }  // namespace
 
-bool CopyFile(const std::string& from, const std::string& to, bool failIfExists, bool readOnly) {
+platform::Result CopyFile(const std::string& from, const std::string& to, bool failIfExists, bool readOnly) {
   std::string content;
   platform::FileInfo info;
-  if (failIfExists && platform::Stat(Checked(to), info)) {
-    platform::SetLastError(80);
-    return false;
-  }
+  if (failIfExists && platform::Stat(Checked(to), info)) return platform::Result::Failure(platform::kErrorFileExists);
   const int64_t readTime = CurrentStamp();
-  if (!platform::ReadFile(Checked(from), content)) return false;
+  if (const platform::Result read = platform::ReadFile(Checked(from), content); !read) return read;
   auto finish = [&](const std::string& beside) {
-    if (!platform::CopyExecuteBits(from, beside)) return false;
+    if (const platform::Result copied = platform::CopyExecuteBits(from, beside); !copied) return copied;
     // A file system whose clock is behind shows in what was written. One that takes no times keeps its own.
     if (platform::Stat(beside, info)) platform::SetWriteTime(beside, std::min(readTime, info.writeTime));
     if (readOnly) platform::SetReadOnlyAttribute(beside, true);
-    return true;
+    return platform::Result();
   };
   try {
     WriteBesideAndRename(Checked(to), content, finish);
   } catch (const FileException& exception) {
-    platform::SetLastError(exception.errorCode);
-    return false;
+    return platform::Result::Failure(exception.errorCode);
   }
-  return true;
+  return {};
 }
 
-bool CreateEmptyFile(const std::string& path, bool keepExisting) {
+platform::Result CreateEmptyFile(const std::string& path, bool keepExisting) {
   return platform::MakeEmptyFile(Checked(path), keepExisting);
 }
 
@@ -113,7 +109,7 @@ void CreateDirectories(const std::string& path, bool includeLast) {
   }
 }
 
-bool SetReadOnly(const std::string& path, bool readOnly) {
+platform::Result SetReadOnly(const std::string& path, bool readOnly) {
   return platform::SetReadOnlyAttribute(Checked(path), readOnly);
 }
 
@@ -156,13 +152,11 @@ std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths) {
   return found;
 }
 
-bool TouchFile(const std::string& path, bool create) {
+platform::Result TouchFile(const std::string& path, bool create) {
   platform::FileInfo info;
-  if (!platform::Stat(Checked(path), info)) return create && platform::MakeEmptyFile(path, true);
-  if (info.isReadOnly) {
-    platform::SetLastError(platform::kErrorAccessDenied);
-    return false;
-  }
+  const platform::Result known = platform::Stat(Checked(path), info);
+  if (!known) return create ? platform::MakeEmptyFile(path, true) : known;
+  if (info.isReadOnly) return platform::Result::Failure(platform::kErrorAccessDenied);
   return platform::StampNow(path);
 }
 
@@ -173,9 +167,15 @@ int64_t OnScaleOf(int64_t stamp, int64_t time) {
   return stamp % kSecond == 0 ? time - time % (2 * kSecond) : time;
 }
 
-bool FullPathOf(const std::string& path, std::string& out) { return platform::FullPath(Checked(path), out); }
-bool RealPathOf(const std::string& path, std::string& out) { return platform::RealPath(Checked(path), out); }
-bool ReadWholeFile(std::string& out, const std::string& path) { return platform::ReadFile(Checked(path), out); }
+platform::Result FullPathOf(const std::string& path, std::string& out) {
+  return platform::FullPath(Checked(path), out);
+}
+platform::Result RealPathOf(const std::string& path, std::string& out) {
+  return platform::RealPath(Checked(path), out);
+}
+platform::Result ReadWholeFile(std::string& out, const std::string& path) {
+  return platform::ReadFile(Checked(path), out);
+}
 
 namespace {
 
@@ -231,7 +231,7 @@ void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarg
   if (readOnly == ReadOnlyTarget::Refuse && platform::IsReadOnlyFile(path) && !platform::IsLink(path)) {
     throw FileException(platform::kErrorAccessDenied, path);
   }
-  WriteBesideAndRename(path, content, [](const std::string&) { return true; });
+  WriteBesideAndRename(path, content, [](const std::string&) { return platform::Result(); });
 }
 
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path) {
@@ -265,9 +265,9 @@ File::File(const std::string& path, FileMode mode) {
   if (!Open(path, mode)) throw FileException(platform::kErrorFileNotFound, path);
 }
 
-File::~File() { CloseStream(); }
+File::~File() = default;
 
-bool File::Open(const std::string& path, FileMode mode) {
+platform::Result File::Open(const std::string& path, FileMode mode) {
   static constexpr const char* kModes[] = {"r", "w", "a", "rb", "wb", "ab"};
   Close();
   Checked(path);
@@ -276,37 +276,32 @@ bool File::Open(const std::string& path, FileMode mode) {
   m_mode = mode;
   const bool forWriting = mode != FileMode::ReadText && mode != FileMode::ReadBinary;
   platform::FileInfo info;
-  if (mode == FileMode::Closed || (forWriting && platform::IsReadOnlyFile(path))) return false;
-  if (platform::Stat(path, info) && !info.isPlain) return false;
-  m_stream = std::fopen(path.c_str(), kModes[static_cast<int>(mode)]);
-  return m_stream != nullptr;
+  const bool isRefused = mode == FileMode::Closed || (forWriting && platform::IsReadOnlyFile(path)) ||
+                         (platform::Stat(path, info) && !info.isPlain);
+  if (isRefused) return platform::Result::Failure(platform::kErrorAccessDenied);
+  return m_file.Open(path, kModes[static_cast<int>(mode)]);
 }
 
-size_t File::Read(void* buffer, size_t length) { return m_stream ? std::fread(buffer, 1, length, m_stream) : 0; }
+size_t File::Read(void* buffer, size_t length) { return m_file.Read(buffer, length); }
 int64_t File::Length() { return m_bytesWritten; }
-int64_t File::Position() { return m_stream ? std::ftell(m_stream) : 0; }
-bool File::Seek(int64_t position) { return m_stream && std::fseek(m_stream, position, SEEK_SET) == 0; }
+int64_t File::Position() { return m_file.Position(); }
+bool File::Seek(int64_t position) { return m_file.Seek(position); }
 
 void File::Write(const void* data, size_t length) {
   if (length == 0) return;
-  if (!m_stream || std::fwrite(data, 1, length, m_stream) != length) {
-    throw FileException(platform::kErrorWriteFault, m_path);
-  }
+  if (!m_file.Write({static_cast<const char*>(data), length})) FailWrite();
   m_bytesWritten += static_cast<int64_t>(length);
 }
 
 void File::Flush() {
-  if (m_stream && std::fflush(m_stream) != 0) throw FileException(platform::kErrorWriteFault, m_path);
+  if (!m_file.Flush()) FailWrite();
 }
 
 void File::Close() {
-  if (!CloseStream()) throw FileException(platform::kErrorWriteFault, m_path);
+  if (!m_file.Close() && IsWritable()) FailWrite();
 }
 
-bool File::CloseStream() {
-  std::FILE* const stream = std::exchange(m_stream, nullptr);
-  return !stream || std::fclose(stream) == 0 || !IsWritable();
-}
+void File::FailWrite() const { throw FileException(platform::kErrorWriteFault, m_path); }
 
 bool File::IsWritable() { return m_mode != FileMode::ReadText && m_mode != FileMode::ReadBinary; }
 
@@ -348,9 +343,7 @@ struct FileOrDirIterator::State {
 FileOrDirIterator::FileOrDirIterator(const std::string& pattern) : m_state(std::make_unique<State>()) {
   const size_t slash = Checked(pattern).rfind('/');
   m_state->directory = slash == std::string::npos ? "." : pattern.substr(0, slash);
-  if (!platform::EntryNames(slash == 0 ? "/" : m_state->directory, m_state->names)) {
-    m_state->failureCode = platform::LastError();
-  }
+  m_state->failureCode = platform::EntryNames(slash == 0 ? "/" : m_state->directory, m_state->names).Code();
 }
 
 uint32_t FileOrDirIterator::FailureCode() const { return m_state->failureCode; }
@@ -362,8 +355,7 @@ const IFileOrDirInfo* FileOrDirIterator::Next() {
   while (m_state->next < m_state->names.size()) {
     const std::string& name = m_state->names[m_state->next++];
     m_state->info.info = {};
-    const bool isKnown = platform::Stat(m_state->directory + "/" + name, m_state->info.info);
-    m_state->entryFailure = isKnown ? 0 : platform::LastError();
+    m_state->entryFailure = platform::Stat(m_state->directory + "/" + name, m_state->info.info).Code();
     if (m_state->entryFailure == platform::kErrorFileNotFound) continue;  // gone meanwhile, or a link to nothing
     m_state->info.info.name = name;
     m_state->info.info.isHidden = name.front() == '.';

@@ -1,9 +1,8 @@
 // The file system layer. All paths are UTF-8; a path that is not valid UTF-8 raises StringConversionException.
-// Operations answer by result (false, 0, empty); only File and OFileStream raise FileException.
+// Operations answer by result (a failure, false, 0, empty); only File and OFileStream raise FileException.
 #pragma once
 
 #include <cstdint>
-#include <cstdio>
 #include <memory>
 #include <string>
 #include <string_view>
@@ -11,6 +10,7 @@
 #include <unordered_set>
 #include <vector>
 
+#include "platform/buffered_file.h"
 #include "text/exceptions.h"
 #include "text/streams.h"
 
@@ -21,13 +21,13 @@ class DirectoryTimes;
 }
 
 bool FileExists(const std::string& path);  // a plain file that opens for reading: no directory, pipe, socket, device
-bool DeleteFile(const std::string& path);
+platform::Result DeleteFile(const std::string& path);
 // The copy bears the time at which the reading began, so that what is written into the source behind that is newer. A
 // program stays executable; a read-only target is replaced like any other, a link and not what it leads to.
-bool CopyFile(const std::string& from, const std::string& to, bool failIfExists, bool readOnly = false);
-bool CreateEmptyFile(const std::string& path, bool keepExisting);
+platform::Result CopyFile(const std::string& from, const std::string& to, bool failIfExists, bool readOnly = false);
+platform::Result CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
-bool SetReadOnly(const std::string& path, bool readOnly);
+platform::Result SetReadOnly(const std::string& path, bool readOnly);
 int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a missing and for no plain file
 // The same for many files of few directories, which must stay where they are meanwhile.
 class FileTimes {
@@ -41,14 +41,14 @@ class FileTimes {
   std::unordered_map<std::string, std::unique_ptr<platform::DirectoryTimes>> m_directories;
 };
 std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths);  // of many files, by several threads
-bool TouchFile(const std::string& path, bool create);
+platform::Result TouchFile(const std::string& path, bool create);
 int64_t CurrentStamp();  // that a file gets which is written now, on a file system with fine stamps
 // A time that was taken by this clock as the file system would have stamped it which gave `stamp`: some keep whole
 // seconds or two.
 int64_t OnScaleOf(int64_t stamp, int64_t time);
-bool FullPathOf(const std::string& path, std::string& out);
-bool RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
-bool ReadWholeFile(std::string& out, const std::string& path);
+platform::Result FullPathOf(const std::string& path, std::string& out);
+platform::Result RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
+platform::Result ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
 bool LoadStream(std::string& out, const std::string& path);  // as LoadText with folding, also from a pipe or device
 
@@ -61,7 +61,7 @@ class LeftoverSweep {
   std::unordered_set<std::string> m_swept;  // folders, with a slash at the end
 };
 
-// Replaces the file as a whole: written beside, then renamed, so that a half-written file never stands under `path`.
+// Replaces the file as a whole: written beside, then renamed, so that there is never a half-written file at `path`.
 // Raises FileException. A read-only target fails with code 5, unless the flag is the caller's own: it was cleared, but
 // another run may just have set it again.
 enum class ReadOnlyTarget { Refuse, Replace };
@@ -85,7 +85,7 @@ class File : public IFile {
   File() = default;
   File(const std::string& path, FileMode mode);  // raises FileException with code 2
   ~File() override;
-  bool Open(const std::string& path, FileMode mode);
+  platform::Result Open(const std::string& path, FileMode mode);
   size_t Read(void* buffer, size_t length) override;
   int64_t Length() override;  // bytes written so far
   int64_t Position() override;
@@ -96,8 +96,8 @@ class File : public IFile {
   bool IsWritable() override;
 
  private:
-  bool CloseStream();  // false: bytes got lost
-  std::FILE* m_stream = nullptr;
+  [[noreturn]] void FailWrite() const;
+  platform::BufferedFile m_file;
   FileMode m_mode = FileMode::Closed;
   std::string m_path;
   int64_t m_bytesWritten = 0;

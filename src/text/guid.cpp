@@ -8,7 +8,7 @@ namespace qrex {
 
 namespace {
 
-// Where byte i of the text form stands in memory: the first three fields are little-endian.
+// Where byte i of the text form is in memory: the first three fields are little-endian.
 constexpr size_t kTextOrder[16] = {3, 2, 1, 0, 5, 4, 7, 6, 8, 9, 10, 11, 12, 13, 14, 15};
 constexpr std::string_view kShape = "{########-####-####-####-############}";
 

@@ -1,6 +1,5 @@
 #include "text/output_notes.h"
 
-#include "platform/error.h"
 #include "platform/file_system.h"
 #include "text/exceptions.h"
 #include "text/numbers.h"
@@ -16,7 +15,7 @@ constexpr uint32_t kMagic = 0x2AEF78F2;
 
 bool IsThere(const std::string& path) {
   platform::FileInfo info;
-  return platform::Stat(path, info) || !platform::IsNotFound(platform::LastError());
+  return !platform::Stat(path, info).IsNotFound();
 }
 
 }  // namespace

@@ -2,7 +2,6 @@
 
 #include <algorithm>
 
-#include "platform/error.h"
 #include "platform/file_system.h"
 #include "text/files.h"
 
@@ -77,7 +76,7 @@ void GeneratedFile::Spill() {
       CreateDirectories(m_path, false);
       m_leftovers.Beside(m_path);
       m_spilled.emplace(m_path);
-      if (!m_beside.Open(m_spilled->Path(), FileMode::WriteBinary)) throw FileException(m_path);
+      Require(m_beside.Open(m_spilled->Path(), FileMode::WriteBinary), m_path);
     }
     m_beside.Write(m_buffer.data(), m_used);
   });
@@ -90,7 +89,7 @@ std::string GeneratedFile::Text() {
   std::string text;
   Try([&] {
     m_beside.Flush();
-    if (!ReadWholeFile(text, m_spilled->Path())) throw FileException(m_path);
+    Require(ReadWholeFile(text, m_spilled->Path()), m_path);
   });
   RaiseFailure();
   return text;
@@ -104,13 +103,13 @@ void GeneratedFile::Commit() {
   Spill();
   Try([this] { m_beside.Close(); });
   RaiseFailure();
-  if (!platform::RenameFile(m_spilled->Path(), m_path)) throw FileException(m_path);
+  Require(platform::RenameFile(m_spilled->Path(), m_path), m_path);
   m_spilled.reset();
 }
 
 namespace {
 
-// Whether the bytes are this text, each line feed of which may stand as CR LF or CR.
+// Whether the bytes are this text, each line feed of which may be CR LF or CR.
 bool HoldText(std::string_view bytes, std::string_view text) {
   if (text.find('\r') != text.npos) return false;
   while (!text.empty()) {
@@ -152,7 +151,7 @@ int WriteIfChanged(LeftoverSweep& leftovers, MemoryTextWriter& writer, const std
 }
 
 void ChangeReadOnly(const std::string& path, bool readOnly) {
-  if (SetReadOnly(path, readOnly) || platform::IsNotFound(platform::LastError()) || !FileExists(path)) return;
+  if (const platform::Result set = SetReadOnly(path, readOnly); set || set.IsNotFound() || !FileExists(path)) return;
   TraceWriter() << "Failure " << (readOnly ? "setting" : "clearing") << " read only status of file " << path << "\n";
 }
 
@@ -179,7 +178,9 @@ bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::s
     return false;
   };
   platform::FileInfo source;
-  if (!platform::Stat(from, source)) return platform::LastError() == platform::kErrorFileNotFound || fail();
+  if (const platform::Result known = platform::Stat(from, source); !known) {
+    return known.Code() == platform::kErrorFileNotFound || fail();
+  }
   platform::FileInfo target;
   const bool exists = platform::Stat(to, target) && target.isPlain;
   if (!source.isPlain) return true;
@@ -195,25 +196,25 @@ bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::s
   return true;
 }
 
-bool DeleteThoughReadOnly(const std::string& path) {
+platform::Result DeleteThoughReadOnly(const std::string& path) {
   ChangeReadOnly(path, false);
   return DeleteFile(path);
 }
 
 bool DeleteReporting(const std::string& path) {
-  if (DeleteThoughReadOnly(path)) {
+  const platform::Result deleted = DeleteThoughReadOnly(path);
+  if (deleted) {
     TraceWriter() << "Deleting " << path << "\n";
     return true;
   }
-  const uint32_t code = platform::LastError();
   platform::FileInfo info;
-  if (platform::IsNotFound(code) || (platform::Stat(path, info) && info.isDirectory)) return true;  // no file of ours
-  TraceWriter() << "Error: Couldn't delete " << path << " : " << SystemErrorText(code) << "\n";
+  if (deleted.IsNotFound() || (platform::Stat(path, info) && info.isDirectory)) return true;  // no file of ours
+  TraceWriter() << "Error: Couldn't delete " << path << " : " << SystemErrorText(deleted.Code()) << "\n";
   return false;
 }
 
 void RemoveLink(const std::string& path) {
-  if (platform::IsLink(path) && !platform::RemoveFile(path)) throw FileException(path);
+  if (platform::IsLink(path)) Require(platform::RemoveFile(path), path);
 }
 
 }  // namespace qrex

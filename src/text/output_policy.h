@@ -20,7 +20,7 @@ FileUpdate UpdateFile(LeftoverSweep& leftovers, MemoryTextWriter& writer, const 
 // The same: 1 when written, else 0.
 int WriteIfChanged(LeftoverSweep& leftovers, MemoryTextWriter& writer, const std::string& path);
 
-// The text with each line feed as CR LF: how every generated file stands on disk.
+// The text with each line feed as CR LF: the form of every generated file on disk.
 std::string WithCarriageReturns(std::string_view text);
 
 // A generated file while it is composed, with CR LF line ends. It replaces the target as a whole when it is committed;
@@ -63,7 +63,7 @@ bool CopyIfNewer(LeftoverSweep& leftovers, const std::string& from, const std::s
 void ChangeReadOnly(const std::string& path, bool readOnly);
 
 // Clears the read-only flag and deletes; false when no file was deleted.
-bool DeleteThoughReadOnly(const std::string& path);
+platform::Result DeleteThoughReadOnly(const std::string& path);
 
 // The same, and writes "Deleting " and the path when a file was deleted; false, with a message, when one stays.
 bool DeleteReporting(const std::string& path);

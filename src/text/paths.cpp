@@ -1,8 +1,9 @@
 #include "text/paths.h"
 
 #include <algorithm>
-#include <filesystem>
 #include <utility>
+
+#include "platform/file_system.h"
 
 namespace qrex {
 
@@ -10,7 +11,7 @@ namespace {
 
 char Fold(char c) { return c >= 'A' && c <= 'Z' ? static_cast<char>(c + ('a' - 'A')) : c; }
 
-// The component at the head, with the rest moved behind its slash; false when no slash stands in the text.
+// The component at the head, with the rest moved behind its slash; false when the text has no slash.
 bool TakeComponent(std::string_view& path, std::string_view& component) {
   const size_t slash = path.find('/');
   if (slash == std::string_view::npos) return false;
@@ -60,9 +61,7 @@ std::string NormalisePath(std::string_view path) {
   return normal;
 }
 
-std::string CollapseDots(std::string_view path) {
-  return std::filesystem::path(path).lexically_normal().generic_string();
-}
+std::string CollapseDots(std::string_view path) { return platform::CollapseDots(path); }
 
 bool HasExtension(std::string_view path, std::string_view extension) {
   const size_t dot = path.rfind('.');

@@ -4,6 +4,7 @@
 #include <memory>
 #include <string>
 
+#include "platform/buffered_file.h"
 #include "text/exceptions.h"
 #include "text/streams.h"
 
@@ -20,14 +21,13 @@ class StdioOutputStream : public IOutputStream {
 class OFileStream : public ICloseableOutputStream {
  public:
   OFileStream(const std::string& path, bool textMode);
-  ~OFileStream() override;
   void Write(const void* data, size_t length) override;
   void Flush() override;
   void Close() override;
 
  private:
-  void WriteBytes(const char* data, size_t length);
-  std::FILE* m_file = nullptr;
+  void WriteBytes(std::string_view bytes);
+  platform::BufferedFile m_file;
   std::string m_path;
   bool m_textMode;
 };

@@ -4,7 +4,6 @@
 #include <cstring>
 
 #include "platform/console.h"
-#include "platform/error.h"
 #include "platform/file_system.h"
 #include "text/stream_adapters.h"
 #include "text/trace.h"
@@ -100,41 +99,28 @@ void StdioOutputStream::Write(const void* data, size_t length) {
 OFileStream::OFileStream(const std::string& path, bool textMode) : m_path(path), m_textMode(textMode) {
   if (!platform::IsValidUtf8(path)) throw StringConversionException();
   if (platform::IsReadOnlyFile(path)) throw FileException(platform::kErrorAccessDenied, path);
-  platform::SetLastError(0);
-  m_file = std::fopen(path.c_str(), "wb");
-  if (!m_file) throw FileException(path);
+  Require(m_file.Open(path, "wb"), path);
 }
 
-OFileStream::~OFileStream() {
-  if (m_file) std::fclose(m_file);
-}
-
-void OFileStream::WriteBytes(const char* data, size_t length) {
-  if (std::fwrite(data, 1, length, m_file) != length) throw FileException(m_path);
-}
+void OFileStream::WriteBytes(std::string_view bytes) { Require(m_file.Write(bytes), m_path); }
 
 void OFileStream::Write(const void* data, size_t length) {
-  const char* begin = static_cast<const char*>(data);
-  const char* const end = begin + length;
-  while (m_textMode && begin < end) {
-    const void* lineFeed = std::memchr(begin, '\n', static_cast<size_t>(end - begin));
-    if (!lineFeed) break;
-    WriteBytes(begin, static_cast<size_t>(static_cast<const char*>(lineFeed) - begin));
-    WriteBytes("\r\n", 2);
-    begin = static_cast<const char*>(lineFeed) + 1;
+  std::string_view rest(static_cast<const char*>(data), length);
+  while (m_textMode) {
+    const size_t lineFeed = rest.find('\n');
+    if (lineFeed == std::string_view::npos) break;
+    WriteBytes(rest.substr(0, lineFeed));
+    WriteBytes("\r\n");
+    rest.remove_prefix(lineFeed + 1);
   }
-  WriteBytes(begin, static_cast<size_t>(end - begin));
+  WriteBytes(rest);
 }
 
-void OFileStream::Flush() {
-  if (std::fflush(m_file) != 0) throw FileException(m_path);
-}
+void OFileStream::Flush() { Require(m_file.Flush(), m_path); }
 
 void OFileStream::Close() {
   std::unique_ptr<OFileStream> self(this);
-  std::FILE* file = m_file;
-  m_file = nullptr;
-  if (file && std::fclose(file) != 0) throw FileException(m_path);
+  Require(m_file.Close(), m_path);
 }
 
 namespace {

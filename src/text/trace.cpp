@@ -1,9 +1,8 @@
 #include "text/trace.h"
 
-#include <cstdio>
-#include <memory>
 #include <mutex>
 
+#include "platform/buffered_file.h"
 #include "platform/console.h"
 #include "platform/system.h"
 #include "text/exceptions.h"
@@ -24,7 +23,8 @@ class TraceSink {
   bool Open(const std::string& path, bool append) {
     std::lock_guard lock(m_lock);
     m_toStdout = path == "stdout";
-    m_file.reset(m_toStdout ? nullptr : std::fopen(path.c_str(), append ? "a" : "w"));
+    m_file.Close();
+    if (!m_toStdout) m_file.Open(path, append ? "a" : "w");
     if (!HasTarget()) return false;
     const std::string pending = std::move(m_pending);
     m_pending.clear();
@@ -35,7 +35,7 @@ class TraceSink {
   void Close() {
     std::lock_guard lock(m_lock);
     m_toStdout = false;
-    m_file.reset();
+    m_file.Close();
     m_pending.clear();
   }
 
@@ -50,7 +50,7 @@ class TraceSink {
   }
 
  private:
-  bool HasTarget() const { return m_toStdout || m_file; }
+  bool HasTarget() const { return m_toStdout || m_file.IsOpen(); }
 
   // Never throws: it runs at the end of a TraceWriter.
   void Put(std::string_view text) {
@@ -58,17 +58,14 @@ class TraceSink {
     if (m_toStdout) {
       platform::WriteStdout(platform::IsValidUtf8(text) ? std::string(text) : platform::WidenBytes(text));
     } else {
-      std::fwrite(text.data(), 1, text.size(), m_file.get());
-      std::fflush(m_file.get());
+      m_file.Write(text);
+      m_file.Flush();
     }
   }
 
-  struct FileCloser {
-    void operator()(std::FILE* file) const { std::fclose(file); }
-  };
   std::mutex m_lock;
   bool m_toStdout = false;
-  std::unique_ptr<std::FILE, FileCloser> m_file;
+  platform::BufferedFile m_file;
   std::string m_pending;
 };
 

@@ -4,7 +4,6 @@
 
 #include "lex/literals.h"
 #include "platform/console.h"
-#include "platform/error.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
@@ -122,8 +121,8 @@ void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFo
                               const std::string& directory) {
   std::string searched = PathJoin(root, directory), realPath;
   if (searched.empty()) searched = ".";  // the folder of the run
-  if (!RealPathOf(searched, realPath)) {
-    if (const uint32_t code = platform::LastError(); !platform::IsNotFound(code)) FailSearch(searched, code);
+  if (const platform::Result found = RealPathOf(searched, realPath); !found) {
+    if (!found.IsNotFound()) FailSearch(searched, found.Code());
     return;
   }
   if (std::find(search.open.begin(), search.open.end(), realPath) != search.open.end()) return;  // a link to itself
@@ -215,7 +214,7 @@ ProjectFolder& ProjectParser::FolderNamed(ProjectFolder& parent, const std::stri
   return made;
 }
 
-// What is made of a file stands at its path, below the folders of outputs.
+// What is made of a file has its path, below the folders of outputs.
 void ProjectParser::RequireInTree(const std::string& path, const char* position) const {
   if (LeadsAbove(path)) throw LexScannerException("Path leads out of the tree : " + path, position);
   if (m_project.usesQrex && IsAbsolutePath(path)) {

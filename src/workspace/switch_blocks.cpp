@@ -71,10 +71,10 @@ class SwitchReader {
 
   MpfwParser& m_parser;
   SwitchChanges& m_changes;
-  const char* m_switch = nullptr;  // the `/` of the switch at hand
+  const char* m_switch = nullptr;  // the `/` of the switch being read
 };
 
-// From the `/`, which is the current token, to the end of the word behind it; stands behind the word afterwards.
+// From the `/`, which is the current token, to the end of the word behind it; behind the word afterwards.
 std::string SwitchReader::ReadSwitchText() {
   m_switch = m_parser.current.text.begin;
   m_parser.Advance();

@@ -25,7 +25,7 @@ struct SwitchChanges {
   bool IsList(std::string_view property) const { return FindProperty(lists, property) != nullptr; }
 };
 
-// The block `{ ... }` at the current token; stands behind it afterwards.
+// The block `{ ... }` at the current token; the parser is behind it afterwards.
 SwitchChanges ReadCompilerSwitches(MpfwParser& parser, bool isRemoval);
 SwitchChanges ReadResourceSwitches(MpfwParser& parser, bool isRemoval);
 

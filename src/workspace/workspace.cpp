@@ -163,11 +163,11 @@ void Workspace::SyncProjectGuids() {
   GuidMap guids;
   std::string bytes;
   try {
-    if (ReadWholeFile(bytes, kGuidFile)) {
+    const platform::Result read = ReadWholeFile(bytes, kGuidFile);
+    if (read) {
       guids = ParseGuids(bytes);
-    } else if (const FileException failure(kGuidFile);
-               failure.errorCode != platform::kErrorFileNotFound && LastWriteTime(kGuidFile) != 0) {
-      throw failure;  // it is there, but can't be read
+    } else if (read.Code() != platform::kErrorFileNotFound && LastWriteTime(kGuidFile) != 0) {
+      Require(read, kGuidFile);  // it is there, but can't be read
     }
     for (const auto& project : projects) {
       auto found = guids.find(project->name);

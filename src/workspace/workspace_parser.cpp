@@ -32,7 +32,7 @@ std::string WorkspaceParser::ParseWorkspace() {
   return name;
 }
 
-// Leaves the closing `}` as the current token: what stands behind the top block is not looked at.
+// Leaves the closing `}` as the current token: what is behind the top block is not looked at.
 void WorkspaceParser::ParseBlock(Project* parent) {
   if (current.kind != kOpenBrace) {
     throw LexScannerException("Expected { when read " + Printed(current), current);

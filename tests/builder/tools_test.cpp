@@ -437,11 +437,11 @@ TEST_F(ToolsTest, GccLinks) {
   WriteProject("shared", "Dynamic-Link Library", "export subproj { \"hidden\" } { }");
   WriteProject("hidden", "Static Library", "{ }");
   Project& app = AddApp("Application", "\"a.cpp\" \"r.rc\"", "subproj { \"top\" \"shared\" \"base\" }");
-  app.configs.front()->linkerText = " -lm \"-Wl,-z now\" \"v/$(Platform).a\" -L$(Configuration)";
+  app.configs.front()->linkerText = " -lm \"-Wl,-z now\" \"v/$(Platform).a\" -L$(Configuration) -Wl,-z,$$x";
   const std::string inputs =
       " \"x64/Debug/app/a.o\" \"lib/x64/Debug/libtop.a\" \"lib/x64/Debug/libmiddle.a\" \"tree/x64/Debug/libshared.so\""
       " \"lib/x64/Debug/libbase.a\" \"v/b.a\" \"-lz\" -Xlinker -rpath -Xlinker '$ORIGIN' -lm \"-Wl,-z now\" "
-      "\"v/x64.a\" -LDebug\n";
+      "\"v/x64.a\" -LDebug -Wl,-z,$x\n";
   Builder(CompilerKind::gcc);
   ASSERT_TRUE(LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder)));
   ASSERT_EQ("g++ @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/app\"" + inputs, TakeLog());

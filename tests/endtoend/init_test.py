@@ -103,6 +103,12 @@ def templates_are_found_where_an_installation_puts_them(workspace):
                        stdout=subprocess.DEVNULL)
         workspace.path("link").unlink()
         holds(workspace.path(f"of/{folder}/settings.inc").read_text(), f'"{workspace.path(data).resolve()}/runtime"')
+    # Where the system does not tell the program's path: by the word that it is called by.
+    hide = "unshare -rm sh -c 'mount -t tmpfs none /proc && %s'"
+    if subprocess.run(hide % "true", shell=True, capture_output=True).returncode == 0:
+        for number, call in enumerate(("installed/bin/Qrex", "../../bin/Qrex", "PATH=none:beside:$PATH Qrex")):
+            folder = "installed/share/qrex" if call.startswith("..") else "."
+            workspace.shell(f"cd {folder} && " + hide % f"{call} --init w {workspace.folder}/hidden{number}")
     shutil.copy(workspace.binary, workspace.path("alone"))
     done = subprocess.run([workspace.path("alone"), "--init", "w"], cwd=workspace.folder, capture_output=True, text=True)
     equal(done.returncode, 1)

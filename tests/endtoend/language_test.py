@@ -7,7 +7,7 @@ import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from runtime_test import LIBRARY  # noqa: E402
+from runtime_fixture import PLAIN, link, write_library  # noqa: E402
 from workspace_fixture import SETTINGS, Workspace, equal, holds, need, run_tests  # noqa: E402
 
 ROOT = Path(__file__).resolve().parents[2]
@@ -106,10 +106,9 @@ def the_examples_print_what_the_page_says(binary):
         root = "qrexsource/x64/Debug"
         sources = ["language", *(Path(name).stem for name in examples.sources if name.endswith(".cpp"))]
         calls = "".join(f'    vesk::xout() << "{name}\\n"; {name}();\n' for name, _ in examples.printed)
-        workspace.write("all.cpp", "".join(f'#include "Vesk/vxObject/src/{name}.cpp"\n' for name in LIBRARY) +
-                        "".join(f'#include "language/src/{name}.cpp"\n' for name in sources) + MAIN % calls)
-        workspace.shell("g++ -std=c++17 -Wall -Werror -Wno-deprecated-declarations -Wno-parentheses "
-                        f"-I{root} -I{root}/language/src -I{root}/Vesk/vxObject/src all.cpp -o all")
+        workspace.write(f"{root}/language/src/all.cpp", "".join(f'#include "language/src/{name}.cpp"\n' for name in sources) + MAIN % calls)
+        write_library(workspace)
+        link(workspace, PLAIN, [f"{root}/language/src/all.cpp"], "all", "-Wno-deprecated-declarations -Wno-parentheses")
         equal(workspace.shell("./all"), "".join(f"{name}\n{text}" for name, text in examples.printed))
 
 

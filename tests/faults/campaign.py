@@ -18,6 +18,7 @@ import os
 import random
 import re
 import shutil
+import signal
 import subprocess
 import sys
 import tempfile
@@ -30,66 +31,19 @@ import stamps
 HERE = Path(__file__).resolve().parent
 sys.path.insert(0, str(HERE.parent / "endtoend"))
 import signals  # noqa: E402
-from signals import PAUSE  # noqa: E402
-from workspace_fixture import SETTINGS, Workspace  # noqa: E402
-
-# The tools: an object is its source, a library or program is what went into it.
-COMPILER = """#!/bin/sh
-eval set -- $(tr -d '\\r' < "${2#@}")
-while [ $# -gt 1 ]; do [ "$1" = -o ] && out=$2; shift; done
-""" + PAUSE + """cp "$1" "$out" && chmod u+w "$out"
-"""
-LIBRARIAN = """#!/bin/sh
-eval set -- "$2" $(tr -d '\\r' < "${3#@}")
-out=$1; shift
-""" + PAUSE + """cat "$@" > "$out"
-"""
-LINKER = """#!/bin/sh
-eval set -- $(tr -d '\\r' < "${1#@}")
-while [ $# -gt 0 ]; do case "$1" in -o) out=$2; shift;; -Xlinker) shift;; -*) ;; *) in="$in $1";; esac; shift; done
-""" + PAUSE + """cat $in > "$out"
-"""
-CLASSES = "".join(f"$struct+ S{i} {{ $int32 a; $int32 b; $int32 c; }};\n" for i in range(700))  # above 256 KiB of text
-
-
-def project(target, files, extra=""):
-    return (f'$TARGET_TYPE = "{target}"\n$ROOT_TO_PROJDIR = "@dirname"\nqrex\nconfig {{ "Debug|x64" }}\n'
-            f"{extra}{files}\n")
-
-
-def files():
-    library = project("Static Library", '{ "zoo.h" "big.h" "notes.txt" "src" { "zoo.cpp" "big.cpp" } }')
-    program = project("Console Application", '{ "src" { "app.cpp" "more.cpp" } }', 'subproj { "zoo" }\n')
-    return {
-        "all.qrex": SETTINGS + 'makeExportedHeaderFilesReadOnly = true\nmakeTranslatedFilesReadOnly = true\n',
-        "tree/.qrwsroot": "",
-        "tree/all.qrws": '"all" { "Vesk/vxObject" "zoo" "app" }\n',
-        "tree/Vesk/vxObject/IObject.h": "namespace vesk { $interface+ IObject { }; $interface+ IPersistable : IObject { }; }\n",
-        "tree/Vesk/vxObject/src/vxObject.cpp": '@import "Vesk/vxObject/IObject.h"\n',
-        "tree/Vesk/vxObject/src/vxObject.qrpj": project("Static Library", '{ "IObject.h" "src" { "vxObject.cpp" } }')
-        .replace("@dirname", "Vesk/vxObject"),
-        "tree/zoo/src/zoo.qrpj": library.replace("@dirname", "zoo"),
-        "tree/zoo/zoo.h": '@import "Vesk/vxObject/IObject.h"\n@def legs = 4\n$enum+ Food { hay, fish };\n',
-        "tree/zoo/big.h": '@import "Vesk/vxObject/IObject.h"\n' + CLASSES,
-        "tree/zoo/notes.txt": "plain\n" * 3000,
-        "tree/zoo/src/zoo.cpp": '@import "zoo/zoo.h"\nint legsOfAll = legs;\n',
-        "tree/zoo/src/big.cpp": '@import "zoo/big.h"\n',
-        "tree/app/src/app.qrpj": program.replace("@dirname", "app"),
-        "tree/app/src/app.cpp": '@import "zoo/zoo.h"\n$init { }\nint main() { return legs; }\n',
-        "tree/app/src/more.cpp": "int more;\n",
-        "tools/gcc-4": COMPILER,
-        "tools/ar": LIBRARIAN,
-        "tools/g++": LINKER,
-    }
-
+import workspaces  # noqa: E402
+from workspace_fixture import Workspace  # noqa: E402
 
 TRANSLATE = ["mode=build", "compiler=gcc", "translateOnly=true"]
 BUILD = ["mode=build", "compiler=gcc"]
+VISUAL = ["mode=build", "compiler=vc14", "platform=\"Win64\""]
 RUNS = {  # name: arguments, and what stands there before
     "translate": (TRANSLATE, None),
     "translate again": (TRANSLATE, TRANSLATE),
     "build": (BUILD, None),
     "build again": (BUILD, BUILD),
+    "build, vc14": (VISUAL, None),
+    "build again, vc14": (VISUAL, VISUAL),
     "gen, gcc": (["mode=gen", "compiler=gcc"], None),
     "gen, vc14": (["mode=gen", "compiler=vc14"], None),
 }
@@ -124,10 +78,10 @@ def outputs(folder):
     number = lambda match: b"ID%d" % identifiers.setdefault(match.group(0), len(identifiers))
     for path in sorted(folder.rglob("*")):
         name = str(path.relative_to(folder))
-        if not path.is_file() or name.startswith(INPUTS) or name.endswith((".rsp", "out1.txt")):
+        if not path.is_file() or name.startswith(INPUTS) or name.endswith((".rsp", "mtdep.bat", "out1.txt")):
             continue  # of a tool that is told what to do: the next run makes them anew
         content = path.read_bytes()
-        if name.endswith((".qrexdep", "projects.guids")):
+        if name.endswith((".qrexdep", "projects.guids", "mt.dep")):
             content = b"" if content else b"empty"
         contents[name] = IDENTIFIER.sub(number, content) if HAS_IDENTIFIER.search(content) else content
     return contents
@@ -154,7 +108,7 @@ class Kind:
         self.binary, self.name, self.library = binary, name, library
         self.arguments, earlier = RUNS[name]
         self.start = folder / name.replace(" ", "_").replace(",", "")
-        workspace = Workspace(binary, files())
+        workspace = Workspace(binary, workspaces.visual() if self.arguments == VISUAL else workspaces.gcc())
         shutil.move(workspace.folder, self.start)
         age = time.time() - 100
         for path in self.start.rglob("*"):
@@ -263,7 +217,7 @@ def full_disk(kind, folder, kib):
         done = run(kind.binary, mount / "w", kind.arguments)
         shutil.copytree(mount / "w", folder / "w", symlinks=True)
     finally:
-        subprocess.run(["umount", mount], check=True)
+        subprocess.run(["umount", "--lazy", mount], check=True)  # a thread that forks has our files open for a moment
     try:
         kind.check(folder / "w", done)
     except Violation as violation:
@@ -331,6 +285,8 @@ def main():
     parser.add_argument("--short", action="store_true", help="some calls of each kind, within two minutes")
     parser.add_argument("--markdown", action="store_true", help="the table as docs/reliability.md has it")
     options = parser.parse_args()
+    for number in signals.SIGNALS[:-1]:  # what runs in the background of a shell ignores some, and so would the runs
+        signal.signal(number, signal.SIG_DFL)
     folder = Path(tempfile.mkdtemp(prefix="qrex-faults-"))
     kept = broken = 0
     if options.markdown:

@@ -40,6 +40,9 @@ TEST_F(SystemTest, CompilerOfTheGccFamily) {
   EXPECT_EQ(7, RunCommand(keeper, "cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
   std::filesystem::rename("bin/gcc", "bin/gcc-4");
   EXPECT_EQ(7, RunCommand(keeper, "gcc-4 x"));
+  EXPECT_EQ(FindProgram("bin/gcc-4"), FindProgram("gcc-4"));
+  EXPECT_EQ(std::filesystem::current_path() / "bin/gcc-4", FindProgram("gcc-4"));
+  EXPECT_EQ("", FindProgram("gcc-5") + FindProgram("none/gcc-4"));
   SetEnvironment("PATH", path);
 }
 
@@ -94,17 +97,13 @@ TEST_F(SystemTest, ErrorCodes) {
   const std::string path = "f";
   std::string content;
   Write(path, "x");
-  EXPECT_FALSE(ReadFile(path + "none", content));
-  EXPECT_EQ(2u, LastError());
-  EXPECT_FALSE(ReadFile(path + "/a", content));
-  EXPECT_EQ(3u, LastError());
-  EXPECT_FALSE(ReadFile(".", content));
-  EXPECT_EQ(5u, LastError());
-  EXPECT_FALSE(MakeEmptyFile(path, false));
-  EXPECT_EQ(80u, LastError());
+  EXPECT_EQ(0u, ReadFile(path, content).Code());
+  EXPECT_EQ(2u, ReadFile(path + "none", content).Code());
+  EXPECT_EQ(3u, ReadFile(path + "/a", content).Code());
+  EXPECT_EQ(5u, ReadFile(".", content).Code());
+  EXPECT_EQ(80u, MakeEmptyFile(path, false).Code());
   SetReadOnlyAttribute(path, true);
-  EXPECT_FALSE(MakeEmptyFile(path, true));  // also for the superuser
-  EXPECT_EQ(5u, LastError());
+  EXPECT_EQ(5u, MakeEmptyFile(path, true).Code());  // also for the superuser
   EXPECT_FALSE(RemoveFile(path));
   SetReadOnlyAttribute(path, false);
   EXPECT_TRUE(RemoveFile(path));

@@ -1,6 +1,8 @@
 // Whole generated texts. A case is a header `cases/NAME.h` and what comes of it, `NAME.expected.h`; with the `.cpp`
 // that imports the header, `NAME.cpp` (or an empty one), and what comes of that, `NAME.expected.cpp`, if it is more
-// than the import. Names that begin with `dll_` or `compilable_` say what the project or its configuration is.
+// than the import. Names that begin with `dll_` or `compilable_` say what the project or its configuration is. The
+// texts of `dll_` are whole; others are expected without the lines around each header, and with tables and traits on
+// one line.
 //
 // `scripts/test --update` writes what is expected anew, and shows what changed.
 #include <cstdlib>
@@ -44,6 +46,23 @@ class CasesTest : public TranslateTest, public ::testing::WithParamInterface<std
   }
 };
 
+// With each constant of a traits class behind the one ahead of it, and opening braces behind what they open.
+std::string Joined(const std::string& text) {
+  std::istringstream lines(text);
+  std::string result;
+  for (std::string line; std::getline(lines, line);) {
+    const size_t begin = std::min(line.find_first_not_of(' '), line.size());
+    const bool isConstant = result.ends_with(";\n") && (line.compare(begin, 18, "static const bool ") == 0 ||
+                                                        line.compare(begin, 20, "static const vesk::E") == 0);
+    if (isConstant || (line.compare(begin, std::string::npos, "{") == 0 && !result.empty())) {
+      result.back() = ' ';
+      line.erase(0, begin);
+    }
+    result += line + '\n';
+  }
+  return result;
+}
+
 TEST_P(CasesTest, GivesWhatIsExpected) try {
   const std::string& name = GetParam();
   settings.compilableText = name.starts_with("compilable_");
@@ -51,14 +70,17 @@ TEST_P(CasesTest, GivesWhatIsExpected) try {
   const std::string import = "@import \"t.h\"\n", source = TextOf(kFolder + name + ".cpp");
   AddFile("t.h", TextOf(kFolder + name + ".h"));
   AddFile("t.cpp", source.empty() ? import : source);
-  Compare(kFolder + name + ".expected.h", Translate("t.h"));
+  const auto shown = [&](const std::string& text) {
+    return name.starts_with("dll_") || text.empty() ? text : Joined(Folded(WithoutGuard(text)));
+  };
+  Compare(kFolder + name + ".expected.h", shown(Translate("t.h")));
   const std::string translated = Translate("t.cpp");
-  Compare(kFolder + name + ".expected.cpp", translated == "#include \"t.h\"\n" ? "" : translated);
+  Compare(kFolder + name + ".expected.cpp", shown(translated == "#include \"t.h\"\n" ? "" : translated));
 } catch (const IException& exception) {
   FAIL() << ExceptionText(exception);
 }
 
-INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& info) { return info.param; });
+INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& each) { return each.param; });
 
 }  // namespace
 }  // namespace qrex

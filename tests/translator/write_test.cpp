@@ -22,11 +22,25 @@ TEST(WriteTest, HolesWithinLines) {
             "f(1,2)");
 }
 
+TEST(WriteTest, HolesOfSeveralTexts) {
+  const auto text = Emitted([](TextWriter& out) {
+    std::string name = "K";
+    const auto vars = WithVars(out, "name"_ = name, "type"_ = std::string("int"), "word"_ = "static");
+    name = "L";  // each text has what was given
+    vars.Write("$word$ $type$ $name$;\n");
+    vars.Write(R"(
+      $name$ $value$
+          $lines$
+    )",
+               "value"_ = 1, "lines"_([&] { out << "a\nb\n"; }));
+  });
+  EXPECT_EQ(text, "static int K;\nK 1\n    a\n    b\n");
+}
+
 TEST(WriteTest, LinesAndMargins) {
   const auto text = Emitted([](TextWriter& out) {
     const Block block(out);
-    Write(
-        out, R"(
+    Write(out, R"(
       struct $name$
       {
           $fields$
@@ -35,7 +49,7 @@ TEST(WriteTest, LinesAndMargins) {
           bool f() { return true$more$; }
       };
     )",
-        "name"_ = "K", "fields"_ = [&] { out << "int a;\nint b;\n"; }, "nothing"_ = "", "more"_ = "\n&& a\n&& b");
+          "name"_ = "K", "fields"_([&] { out << "int a;\nint b;\n"; }), "nothing"_ = "", "more"_ = "\n&& a\n&& b");
   });
   EXPECT_EQ(text,
             "{\n"

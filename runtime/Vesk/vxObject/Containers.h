@@ -22,7 +22,7 @@ constexpr bool IsLeaf = std::is_trivially_copyable<T>::value;
 template <typename C>
 constexpr bool IsLeaf<basic_xstring<C>> = true;
 template <typename A, typename B>
-constexpr bool IsLeaf<std::pair<A, B>> = IsLeaf<std::remove_const_t<A>> && IsLeaf<B>;
+constexpr bool IsLeaf<std::pair<A, B>> = IsLeaf<std::remove_const_t<A>>&& IsLeaf<B>;
 
 // A container that may be assigned a part of itself, as a tree one of its branches, which is destroyed or written over
 // in the midst of a plain assignment.

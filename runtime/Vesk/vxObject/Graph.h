@@ -128,7 +128,7 @@ class DGNode : private QueuePlace, private ChangePlace {
 
   int m_flags;
   mutable bool m_isCalculating = false;
-  mutable bool m_isEmpty = true;  // nothing to evict
+  mutable bool m_isEmpty = true;        // nothing to evict
   mutable EAgain m_again = EAgain::No;  // whether what is being calculated must be calculated again, and how
   mutable ssize_t m_byteSize = 0;
   mutable Links m_inputs;  // in the order in which they were read

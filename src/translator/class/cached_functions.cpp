@@ -143,13 +143,12 @@ void CachedFunction::ReadInput() {
     const std::string body = ReadShortBody(m_parser, m_def, m_inputName);
     m_parser.Advance();
     m_parser.DropToCurrent();
-    Write(
-        m_out, R"(
+    Write(m_out, R"(
       {
           $body$
       }
     )",
-        "body"_ = [&] { m_out << body << "\n"; });
+          "body"_([&] { m_out << body << "\n"; }));
   } else {
     m_out << "\n";
     CopyCodeBlock(m_parser, m_def);
@@ -207,8 +206,7 @@ std::string CachedFunction::Arguments(std::string_view key, std::string_view inp
 // --- Nodes
 
 void CachedFunction::WritePlain() {
-  Write(
-      m_out, R"~(
+  Write(m_out, R"~(
     struct _depnode_$name$ : public $base$
     {
         typedef $base$ base;
@@ -220,16 +218,15 @@ void CachedFunction::WritePlain() {
         $queueIndex$
     } _dn_$name$;
   )~",
-      "name"_ = m_written.name, "class"_ = m_def.name, "base"_ = [&] { WriteBase(); },
-      "calculations"_ = [&] { WriteCalculations(); }, "finalSelf"_ = [&] { WriteFinalSelf("_GetSelf()"); },
-      "queueIndex"_ = [&] { WriteQueueIndex(); });
+        "name"_ = m_written.name, "class"_ = m_def.name, "base"_([&] { WriteBase(); }),
+        "calculations"_([&] { WriteCalculations(); }), "finalSelf"_([&] { WriteFinalSelf("_GetSelf()"); }),
+        "queueIndex"_([&] { WriteQueueIndex(); }));
   WriteAccessor("_dn_" + m_written.name + ".read()");
   m_def.m_evictionMembers.push_back("_dn_" + m_written.name);
 }
 
 void CachedFunction::WriteKeyed() {
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     struct _depnode_$name$ : public $base$
     {
         typedef $base$ base;
@@ -248,10 +245,10 @@ void CachedFunction::WriteKeyed() {
     };
     mutable typename _depnode_$name$::map_type _map_$name$;
   )",
-      "name"_ = m_written.name, "class"_ = m_def.name, "base"_ = [&] { WriteBase(); },
-      "calculations"_ = [&] { WriteCalculations(); }, "pairKey"_ = [&] { WritePairKey(); },
-      "parts"_ = [&] { WriteNameParts(); }, "queueIndex"_ = [&] { WriteQueueIndex(); },
-      "finalSelf"_ = [&] { WriteFinalSelf("_self"); });
+        "name"_ = m_written.name, "class"_ = m_def.name, "base"_([&] { WriteBase(); }),
+        "calculations"_([&] { WriteCalculations(); }), "pairKey"_([&] { WritePairKey(); }),
+        "parts"_([&] { WriteNameParts(); }), "queueIndex"_([&] { WriteQueueIndex(); }),
+        "finalSelf"_([&] { WriteFinalSelf("_self"); }));
   WriteAccessor("_map_" + m_written.name + "[" + KeyExpression(0) + "].read(this)");
   m_def.m_evictionMembers.push_back("_map_" + m_written.name);
 }

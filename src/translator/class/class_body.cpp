@@ -45,7 +45,7 @@ bool StandsBehindConstructor(const QrexParser& parser, const ClassDef& def) {
 
 void ParseClassBody(QrexParser& parser, ClassDef& def) {
   parser.Advance();
-  bool isPrivate = def.kind == ClassKind::Class && def.m_mixinBaseClass.empty();
+  bool isPrivate = def.m_kind == ClassKind::Class && def.m_mixinBaseClass.empty();
   for (int64_t depth = 1;;) {
     if (parser.Is(kEndOfText)) parser.Fail("Met EOS before read matching brace");
     if (parser.Is(kDollar)) {

@@ -78,8 +78,7 @@ void WriteQueries(TextWriter& out, const ClassDef& def) {
 void WriteInterfaceMembers(TextWriter& out, const ClassDef& def, std::string_view scope) {
   const std::string name = def.IsWholeInPlace() ? def.name : def.GetQualifiedName() + def.TemplateArgs();
   const std::string reflected = def.m_reflected ? "&_GetReflected( (" + name + "*) 0)" : "NULL";
-  Write(
-      out, R"(
+  Write(out, R"(
 
     vesk::AnyInterface $scope$QueryInterface(const vesk::ReflectedInterface& _ri)
     {
@@ -91,7 +90,7 @@ void WriteInterfaceMembers(TextWriter& out, const ClassDef& def, std::string_vie
         return $reflected$;
     }
   )",
-      "scope"_ = scope, "queries"_ = [&] { WriteQueries(out, def); }, "reflected"_ = reflected);
+        "scope"_ = scope, "queries"_([&] { WriteQueries(out, def); }), "reflected"_ = reflected);
 }
 
 void WriteInterfaceMembers(TextWriter& out, const ClassDef& def) {
@@ -126,8 +125,7 @@ void WriteInterfaceDefinitions(TextWriter& out, const ClassDef& def) {
 void WriteClassMembers(TextWriter& out, const ClassDef& def) {
   out << "public:\n";
   const IndentScope indent(out, 4);
-  Write(
-      out, R"(
+  Write(out, R"(
     $evict$
     $model$
     $fieldAccessors$
@@ -136,15 +134,14 @@ void WriteClassMembers(TextWriter& out, const ClassDef& def) {
     $reflection$
     $interfaces$
   )",
-      "evict"_ = [&] { WriteEvictDgsNodes(out, def); },
-      "model"_ = If(!def.m_inheritsModel && def.HasEmbeddedModel(), [&] { WriteModelFieldsAndAccessors(out, def); }),
-      "fieldAccessors"_ =
-          [&] {
-            WriteFieldAccessors(out, def, def);
-            for (const ClassDef* mixin : def.m_mixins) WriteFieldAccessors(out, def, *mixin);
-          },
-      "archive"_ = [&] { WriteArchiveMembers(out, def); }, "reflection"_ = [&] { WriteReflectionMembers(out, def); },
-      "interfaces"_ = [&] { WriteInterfaceMembers(out, def); });
+        "evict"_([&] { WriteEvictDgsNodes(out, def); }),
+        "model"_ = If(!def.m_inheritsModel && def.HasEmbeddedModel(), [&] { WriteModelFieldsAndAccessors(out, def); }),
+        "fieldAccessors"_([&] {
+          WriteFieldAccessors(out, def, def);
+          for (const ClassDef* mixin : def.m_mixins) WriteFieldAccessors(out, def, *mixin);
+        }),
+        "archive"_([&] { WriteArchiveMembers(out, def); }), "reflection"_([&] { WriteReflectionMembers(out, def); }),
+        "interfaces"_([&] { WriteInterfaceMembers(out, def); }));
 }
 
 void WriteEvictDgsNodes(TextWriter& out, const ClassDef& def) {
@@ -222,8 +219,8 @@ void WriteArchiveFunctions(TextWriter& out, const ClassDef& def, std::string_vie
 }
 
 void WriteStreamInsertion(TextWriter& out, const ClassDef& def, std::string_view prefix, std::string_view name) {
-  if (def.qualifiers.os == TriState::Off) return;
-  if (def.qualifiers.os == TriState::Unset) {
+  if (def.m_qualifiers.os == TriState::Off) return;
+  if (def.m_qualifiers.os == TriState::Unset) {
     if (!def.IsMixin()) WriteModelStreamInsertion(out, def);
     return;
   }
@@ -259,21 +256,20 @@ void WriteImplementedInterfaces(TextWriter& out, const ClassDef& def) {
 void WriteForwarder(TextWriter& out, const ClassDef& def, const FunctionSignature& method) {
   const bool compilable = def.WantsCompilableText();
   out << "\n";
-  Write(
-      out, "$prefix$inline $type$ __stdcall $method$($parameters$) { $return$_self->$method$($arguments$); }",
-      "prefix"_ = If(compilable, def.FunctionPrefix()), "type"_ = TypeView(method.returnType), "method"_ = method.name,
-      "parameters"_ =
-          [&] { WriteSelfAndArgDeclarations(out, compilable ? def.GetTemplateClassName() : def.name, method); },
-      "return"_ = If(!IsVoid(method.returnType), "return "),
-      "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
+  Write(out, "$prefix$inline $type$ __stdcall $method$($parameters$) { $return$_self->$method$($arguments$); }",
+        "prefix"_ = If(compilable, def.FunctionPrefix()), "type"_ = TypeView(method.returnType),
+        "method"_ = method.name, "parameters"_([&] {
+          WriteSelfAndArgDeclarations(out, compilable ? def.GetTemplateClassName() : def.name, method);
+        }),
+        "return"_ = If(!IsVoid(method.returnType), "return "),
+        "arguments"_([&] { WriteArgNames(out, method.arguments); }));
 }
 
 void WriteAdtFunction(TextWriter& out, const ClassDef& def, const FunctionSignature& method) {
   out << "\n";
-  Write(
-      out, "$api$$type$ __stdcall $method$($parameters$);", "api"_ = ExportPrefix(def),
-      "type"_ = TypeView(method.returnType), "method"_ = method.name,
-      "parameters"_ = [&] { WriteSelfAndArgDeclarations(out, def.name, method); });
+  Write(out, "$api$$type$ __stdcall $method$($parameters$);", "api"_ = ExportPrefix(def),
+        "type"_ = TypeView(method.returnType), "method"_ = method.name,
+        "parameters"_([&] { WriteSelfAndArgDeclarations(out, def.name, method); }));
 }
 
 }  // namespace
@@ -293,8 +289,7 @@ void WriteClassOperators(TextWriter& out, const ClassDef& def) {
 }
 
 void ClassDef::WriteExtraTraits(TextWriter& out) const {
-  Write(
-      out, R"(
+  Write(out, R"(
     template<> struct ClassTypeTraits<$class$>
     {
         static const bool has_reflected_default_ctor = $hasDefaultCtor$;
@@ -314,16 +309,16 @@ void ClassDef::WriteExtraTraits(TextWriter& out) const {
     };
     $implementedInterfaces$
   )",
-      "class"_ = GetQualifiedName(), "hasDefaultCtor"_ = BitText(m_reflected && HasDefaultCtor()),
-      "hasDtor"_ = BitText(m_reflected && HasDtor()), "hasCopy"_ = BitText(m_reflected && HasCopy()),
-      "hasEquality"_ = BitText(m_reflected && HasEquality()), "hasPrint"_ = BitText(m_reflected && HasPrint()),
-      "hasSerialise"_ = BitText(m_reflected && HasSerialise()),
-      "visitsObjects"_ = BitText(m_reflected && IsIObjectVisitable()),
-      "visitsPrefs"_ = BitText(m_reflected && IsPrefVisitable()), "isIObject"_ = BitText(m_implementsIObject),
-      "isIPersistable"_ = BitText(m_implementsIPersistable),
-      "canSerialiseModel"_ = BitText(CanSerialiseEmbeddedModel()), "hasModel"_ = BitText(HasEmbeddedModel()),
-      "inheritsModel"_ = BitText(m_inheritsModel),
-      "implementedInterfaces"_ = [&] { WriteImplementedInterfaces(out, *this); });
+        "class"_ = GetQualifiedName(), "hasDefaultCtor"_ = BitText(m_reflected && HasDefaultCtor()),
+        "hasDtor"_ = BitText(m_reflected && HasDtor()), "hasCopy"_ = BitText(m_reflected && HasCopy()),
+        "hasEquality"_ = BitText(m_reflected && HasEquality()), "hasPrint"_ = BitText(m_reflected && HasPrint()),
+        "hasSerialise"_ = BitText(m_reflected && HasSerialise()),
+        "visitsObjects"_ = BitText(m_reflected && IsIObjectVisitable()),
+        "visitsPrefs"_ = BitText(m_reflected && IsPrefVisitable()), "isIObject"_ = BitText(m_implementsIObject),
+        "isIPersistable"_ = BitText(m_implementsIPersistable),
+        "canSerialiseModel"_ = BitText(CanSerialiseEmbeddedModel()), "hasModel"_ = BitText(HasEmbeddedModel()),
+        "inheritsModel"_ = BitText(m_inheritsModel),
+        "implementedInterfaces"_([&] { WriteImplementedInterfaces(out, *this); }));
 }
 
 std::vector<const InterfaceDef*> AllInterfaces(const ClassDef& def) {

@@ -77,7 +77,7 @@ void ClassStatement::CheckImplement() {
     NameSpaceElement* found = m_parser.Current().Lookup(m_name);
     if (found) {
       m_old = found->category == Category::Class ? static_cast<ClassDef*>(found) : nullptr;
-      if (!m_old || m_old->kind != m_kind) m_parser.FailConflict(KeywordOf(m_kind), m_name, *found);
+      if (!m_old || m_old->m_kind != m_kind) m_parser.FailConflict(KeywordOf(m_kind), m_name, *found);
     }
   }
   if (!m_implement) return;
@@ -169,7 +169,7 @@ void ClassStatement::ParseInterfaces() {
   }
   if (m_def->m_implementsIPersistable) {
     m_def->m_reflected = m_def->m_registered = m_def->m_strict = true;
-    if (m_def->qualifiers.abstract == TriState::On || m_def->qualifiers.dc == TriState::Off) {
+    if (m_def->m_qualifiers.abstract == TriState::On || m_def->m_qualifiers.dc == TriState::Off) {
       m_parser.Fail("IPersistable classes must have a default constructor");
     }
   }
@@ -179,9 +179,9 @@ void ClassStatement::ParseInterfaces() {
 void ClassStatement::CheckGeneratedOps() {
   if (m_def->m_implementsIObject && m_def->m_inheritsModel) m_def->m_reflected = true;
   if (m_def->IsMixin()) return;
-  bool genop = m_def->qualifiers.genop == TriState::On;
-  if (m_def->m_referencedModel) genop |= m_def->m_referencedModel->qualifiers.genop == TriState::On;
-  for (const ClassDef* mixin : m_def->m_mixins) genop |= mixin->qualifiers.genop == TriState::On;
+  bool genop = m_def->m_qualifiers.genop == TriState::On;
+  if (m_def->m_referencedModel) genop |= m_def->m_referencedModel->m_qualifiers.genop == TriState::On;
+  for (const ClassDef* mixin : m_def->m_mixins) genop |= mixin->m_qualifiers.genop == TriState::On;
   if (!genop) return;
   if (!m_def->m_reflected) {
     m_def->m_reflected = true;
@@ -192,7 +192,7 @@ void ClassStatement::CheckGeneratedOps() {
   }
 }
 
-// Whether a model may come whose archive functions stand in the class: one of a template or mixin, of an entry of a
+// Whether a model may come whose archive functions are in the class: one of a template or mixin, of an entry of a
 // mixin list, or of a class inside of this one. What they call must be declared ahead of the outermost class.
 bool ClassStatement::ArchivesInPlace() const {
   if (IsNested() || !m_def->WantsCompilableText()) return false;
@@ -236,7 +236,7 @@ void ClassStatement::ParseDefinition() {
         $public$
             typedef $base$ BaseClass;
       )",
-            "public"_ = If(m_def->kind == ClassKind::Class, "public:"), "base"_ = m_def->m_mixinBaseClass);
+            "public"_ = If(m_def->m_kind == ClassKind::Class, "public:"), "base"_ = m_def->m_mixinBaseClass);
       m_parser.DropBehindCurrent();
     }
   }

@@ -128,24 +128,22 @@ void ClassRecord::WriteModelFields() {
     WriteMapOrSetFunctions(*mixed.field);
   }
   if (fields.empty() && !m_def.m_referencedModel) return;
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     static const vesk::ReflectedModelField $class$_modelFields[] =
     {
         $rows$
     };
   )",
-      "class"_ = m_name, "rows"_ = [&] { m_modelFieldCount = WriteModelFieldRows(m_out, m_def); });
+        "class"_ = m_name, "rows"_([&] { m_modelFieldCount = WriteModelFieldRows(m_out, m_def); }));
 }
 
 void ClassRecord::WriteMethodRow(const FunctionSignature& method) {
   const std::string prefix = m_name + "_" + method.name;
   auto parameters = [&] { WriteSelfAndArgDeclarations(m_out, m_name, method); };
   auto forwarder = [&] {
-    Write(
-        m_out, "[]($parameters$) -> $type$ { $return$_self->$method$($arguments$); }", "parameters"_ = parameters,
-        "type"_ = TypeView(method.returnType), "return"_ = If(!IsVoid(method.returnType), "return "),
-        "method"_ = method.name, "arguments"_ = [&] { WriteArgNames(m_out, method.arguments); });
+    Write(m_out, "[]($parameters$) -> $type$ { $return$_self->$method$($arguments$); }", "parameters"_ = parameters,
+          "type"_ = TypeView(method.returnType), "return"_ = If(!IsVoid(method.returnType), "return "),
+          "method"_ = method.name, "arguments"_([&] { WriteArgNames(m_out, method.arguments); }));
   };
   auto address = [&] {
     // The function behind a class in place is a template, or hidden in the class around: it has no address to name
@@ -194,16 +192,28 @@ void ClassRecord::WriteInterfaces() {
         "direct"_ = Each(m_out, m_def.m_interfaces, "", row));
 }
 
+// As ReflectedClass::m_flags of the runtime has them.
+enum ClassFlag : uint32_t {
+  kFlagClass = 1,
+  kFlagModel = 2,
+  kFlagHasModel = 4,
+  kFlagReferencesModel = 8,
+  kFlagAdt = 16,
+  kFlagPassByValue = 32,
+  kFlagReturnByValue = 64,
+  kFlagRod = 128
+};
+
 uint32_t ClassRecord::Flags() const {
   uint32_t flags = 0;
-  if (m_def.kind == ClassKind::Class) flags |= 1;
-  if (m_def.IsPureModel()) flags |= 2;
-  if (m_def.HasEmbeddedModel()) flags |= 4;
-  if (m_def.m_referencedModel) flags |= 8;
-  if (m_def.IsAdt()) flags |= 16;
-  if (m_def.qualifiers.passbyvalue == TriState::On) flags |= 32;
-  if (m_def.qualifiers.returnbyvalue == TriState::On) flags |= 64;
-  if (m_def.qualifiers.rod == TriState::On) flags |= 128;
+  if (m_def.m_kind == ClassKind::Class) flags |= kFlagClass;
+  if (m_def.IsPureModel()) flags |= kFlagModel;
+  if (m_def.HasEmbeddedModel()) flags |= kFlagHasModel;
+  if (m_def.m_referencedModel) flags |= kFlagReferencesModel;
+  if (m_def.IsAdt()) flags |= kFlagAdt;
+  if (m_def.m_qualifiers.passbyvalue == TriState::On) flags |= kFlagPassByValue;
+  if (m_def.m_qualifiers.returnbyvalue == TriState::On) flags |= kFlagReturnByValue;
+  if (m_def.m_qualifiers.rod == TriState::On) flags |= kFlagRod;
   return flags;
 }
 
@@ -218,8 +228,7 @@ void ClassRecord::WriteRecord() {
             "direct"_ = m_def.m_interfaces.size());
     }
   };
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     static const vesk::ReflectedClass $class$_class =
     {
         $flags$,
@@ -239,20 +248,19 @@ void ClassRecord::WriteRecord() {
         }
     };
   )",
-      "class"_ = m_name, "flags"_ = Flags(), "qualifiedName"_ = m_def.GetQualifiedName(), "templateClass"_ = className,
-      "metadata"_ = NameOrZero(!m_def.metadata.empty(), Part("_metadata")),
-      "fields"_ = CountedName(m_fieldCount, Part("_fields")),
-      "modelFields"_ = CountedName(m_modelFieldCount, Part("_modelFields")),
-      "depFields"_ = CountedName(m_depFieldCount, Part("_depfields")),
-      "methods"_ = CountedName(m_def.m_methods.size(), Part("_methods")),
-      "strings"_ = NameOrZero(!m_strings.Empty(), Part("_stringTable")), "interfaces"_ = interfaces, "stubs"_ = stubs,
-      "create"_ = NameOrZero(HasCreateFunction(m_def), "&" + className + "::sfnCreateInstance"),
-      "operations"_ = [&] { WriteTypeOps(m_out, m_name, m_def.TypeOpsBits()); });
+        "class"_ = m_name, "flags"_ = Flags(), "qualifiedName"_ = m_def.GetQualifiedName(),
+        "templateClass"_ = className, "metadata"_ = NameOrZero(!m_def.metadata.empty(), Part("_metadata")),
+        "fields"_ = CountedName(m_fieldCount, Part("_fields")),
+        "modelFields"_ = CountedName(m_modelFieldCount, Part("_modelFields")),
+        "depFields"_ = CountedName(m_depFieldCount, Part("_depfields")),
+        "methods"_ = CountedName(m_def.m_methods.size(), Part("_methods")),
+        "strings"_ = NameOrZero(!m_strings.Empty(), Part("_stringTable")), "interfaces"_ = interfaces, "stubs"_ = stubs,
+        "create"_ = NameOrZero(HasCreateFunction(m_def), "&" + className + "::sfnCreateInstance"),
+        "operations"_([&] { WriteTypeOps(m_out, m_name, m_def.TypeOpsBits()); }));
 }
 
 void ClassRecord::WriteFunction() {
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     $api$vesk::ReflectedClass const& _GetReflected($class$ const*)
     {
         $arrays$
@@ -261,8 +269,8 @@ void ClassRecord::WriteFunction() {
         return $class$_class;
     }
   )",
-      "api"_ = If(!m_def.IsWholeInPlace(), ExportPrefix(m_def)), "class"_ = m_name, "arrays"_ = [&] { WriteArrays(); },
-      "record"_ = [&] { WriteRecord(); });
+        "api"_ = If(!m_def.IsWholeInPlace(), ExportPrefix(m_def)), "class"_ = m_name, "arrays"_([&] { WriteArrays(); }),
+        "record"_([&] { WriteRecord(); }));
 }
 
 // In the order in which the string table takes their names.
@@ -276,7 +284,7 @@ void ClassRecord::WriteArrays() {
   WriteInterfaces();
 }
 
-// `heading`: what stands ahead of the name of the function, and what qualifies it.
+// `heading`: what is ahead of the name of the function, and what qualifies it.
 void WriteCreateInstance(TextWriter& out, const ClassDef& def, std::string_view heading, std::string_view scope) {
   auto found = std::find_if(def.m_interfaces.begin(), def.m_interfaces.end(),
                             [](const InterfaceDef* interface) { return interface->SubtypesIObject(); });

@@ -137,13 +137,12 @@ void NodeField::ReadShortForm() {
   const std::string body = ReadShortBody(m_parser, m_def, m_name);
   m_sections |= kCalc;
   WriteSectionHead(kCalcSection);
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     {
         $body$
     }
   )",
-      "body"_ = [&] { m_out << body << "\n"; });
+        "body"_([&] { m_out << body << "\n"; }));
 }
 
 void NodeField::ReadSections() {
@@ -182,8 +181,7 @@ void NodeField::WriteSectionHead(const SectionWord& section) {
 void NodeField::WriteDep() {
   const TypeView type = m_type;
   if (!m_isVoid) Write(m_out, "mutable $type$ $storage$;\n", "type"_ = type, "storage"_ = m_storage);
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     struct Depnode_$name$ : vesk::DGDepNode
     {
         typedef $type$ value_type;
@@ -204,14 +202,14 @@ void NodeField::WriteDep() {
         $readers$
     } $name$;
   )",
-      "name"_ = m_name, "class"_ = m_def.name, "type"_ = type,
-      "hard"_ = If(m_hard, "|vesk::DF_PROPAGATE_HARD_DIRTINESS"), "noCreation"_ = If(!Has(kCreate), " {}"),
-      "creation"_ = [&] { WriteCreation(m_self); }, "destructor"_ = [&] { WriteDestructor("Depnode", m_self); },
-      "valueSelf"_ = If(!m_isVoid, m_self),
-      "additionalSize"_ = m_isVoid ? "0" : "vesk::CacheValueAdditionalSize(" + m_stored + ")",
-      "visiting"_ = [&] { WriteVisiting(); }, "recalculation"_ = [&] { WriteRecalculation(); },
-      "isEvictable"_ = [&] { WriteIsEvictable(); }, "onEvict"_ = [&] { WriteOnEvict(); },
-      "onInvalidate"_ = [&] { WriteOnInvalidate(); }, "readers"_ = [&] { WriteDepReaders(); });
+        "name"_ = m_name, "class"_ = m_def.name, "type"_ = type,
+        "hard"_ = If(m_hard, "|vesk::DF_PROPAGATE_HARD_DIRTINESS"), "noCreation"_ = If(!Has(kCreate), " {}"),
+        "creation"_([&] { WriteCreation(m_self); }), "destructor"_([&] { WriteDestructor("Depnode", m_self); }),
+        "valueSelf"_ = If(!m_isVoid, m_self),
+        "additionalSize"_ = m_isVoid ? "0" : "vesk::CacheValueAdditionalSize(" + m_stored + ")",
+        "visiting"_([&] { WriteVisiting(); }), "recalculation"_([&] { WriteRecalculation(); }),
+        "isEvictable"_([&] { WriteIsEvictable(); }), "onEvict"_([&] { WriteOnEvict(); }),
+        "onInvalidate"_([&] { WriteOnInvalidate(); }), "readers"_([&] { WriteDepReaders(); }));
   if (m_isVoid) return;
   Write(m_out, "$type$$passing$ Get$name$() const { $name$.ReadBarrier(); return $storage$; }\n", "type"_ = type,
         "passing"_ = m_passing, "name"_ = m_name, "storage"_ = m_storage);
@@ -219,8 +217,7 @@ void NodeField::WriteDep() {
 
 void NodeField::WriteIndep() {
   const std::string self = m_def.name + "* _self = ATTRIB_CAST(" + m_def.name + "," + m_name + ");";
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     $type$ $storage$;
     struct Indepnode_$name$ : vesk::DGIndepNode
     {
@@ -241,14 +238,14 @@ void NodeField::WriteIndep() {
     $type$$passing$ Get$name$() const { $name$.ReadBarrier(); return $storage$; }
     void Set$name$($type$$passing$ _v) { $name$.OnChange(); $storage$ = _v; }
   )",
-      "name"_ = m_name, "class"_ = m_def.name, "type"_ = TypeView(m_type), "passing"_ = m_passing,
-      "storage"_ = m_storage, "constructor"_ = If(Has(kCreate), "Indepnode_" + m_name + "()"),
-      "creation"_ = [&] { WriteCreation(self); }, "destructor"_ = [&] { WriteDestructor("Indepnode", self); },
-      "visiting"_ = [&] { WriteVisiting(); }, "isEvictable"_ = [&] { WriteIsEvictable(); },
-      "onEvict"_ = [&] { WriteOnEvict(); });
+        "name"_ = m_name, "class"_ = m_def.name, "type"_ = TypeView(m_type), "passing"_ = m_passing,
+        "storage"_ = m_storage, "constructor"_ = If(Has(kCreate), "Indepnode_" + m_name + "()"),
+        "creation"_([&] { WriteCreation(self); }), "destructor"_([&] { WriteDestructor("Indepnode", self); }),
+        "visiting"_([&] { WriteVisiting(); }), "isEvictable"_([&] { WriteIsEvictable(); }),
+        "onEvict"_([&] { WriteOnEvict(); }));
 }
 
-// --- Members of a node. Those of an $indep are written only where a section stands behind them.
+// --- Members of a node. Those of an $indep are written only where a section follows them.
 
 void NodeField::WriteCreation(std::string_view self) {
   if (!Has(kCreate)) return;
@@ -388,14 +385,13 @@ void ParseEvict(QrexParser& parser, ClassDef& def) {
   const std::string content = ReadBraceContent(parser, def);
   parser.out << "void EvictDgsNodes_extra() const;\n";
   MemoryTextWriter deferred;
-  Write(
-      deferred, R"(
+  Write(deferred, R"(
     void $class$::EvictDgsNodes_extra() const
     {
         $content$
     }
   )",
-      "class"_ = def.GetQualifiedName(), "content"_ = [&] { deferred << content << "\n"; });
+        "class"_ = def.GetQualifiedName(), "content"_([&] { deferred << content << "\n"; }));
   def.m_deferredText += deferred.TakeText();
   DropBlock(parser);
 }
@@ -405,16 +401,15 @@ void ParseVisit(QrexParser& parser, ClassDef& def) {
   def.m_hasVisitBlock = true;
   const std::string content = ReadBraceContent(parser, def);
   auto define = [&](TextWriter& out, std::string_view scope) {
-    Write(
-        out, R"(
+    Write(out, R"(
       void $scope$VisitObjects(vesk::IObjectVisitor& v) const
       {
           $visitBase$
           $content$
       }
     )",
-        "scope"_ = scope, "visitBase"_ = If(HasGeneratedBase(def), "BaseClass::VisitObjects(v);"),
-        "content"_ = [&] { out << content << "\n"; });
+          "scope"_ = scope, "visitBase"_ = If(HasGeneratedBase(def), "BaseClass::VisitObjects(v);"),
+          "content"_([&] { out << content << "\n"; }));
   };
   parser.out << "\n";
   if (IsDefinedInTail(def)) {

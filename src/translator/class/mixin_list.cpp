@@ -86,7 +86,7 @@ class MixinList {
     }
     ClassDef& model = MakeAnonymous(ClassKind::Model);
     model.m_isAnonymous = true;
-    model.qualifiers.genop = m_def.qualifiers.genop;
+    model.m_qualifiers.genop = m_def.m_qualifiers.genop;
     ParseModelStruct(m_parser, model);
     m_parser.Advance();
     WriteModelMixin(m_parser.out, model);

@@ -28,7 +28,7 @@ DeclKind DeclKindOf(ClassKind kind) {
 }  // namespace
 
 ClassDef::ClassDef(ScannedFile& owner, const char* position, ClassKind kind)
-    : RecordedElement(owner, position, DeclKindOf(kind)), kind(kind) {}
+    : RecordedElement(owner, position, DeclKindOf(kind)), m_kind(kind) {}
 
 std::string_view KeywordOf(ClassKind kind) { return TraitsOf(DeclKindOf(kind)).keyword; }
 
@@ -90,31 +90,31 @@ std::string ClassDef::TemplatePrefix(std::string_view behind) const {
 std::string_view ClassDef::FriendWord() const { return m_enclosing && WantsCompilableText() ? "friend " : ""; }
 
 bool ClassDef::CanBeCreated() const {
-  return qualifiers.abstract != TriState::On && (!IsAdt() || m_implementsIPersistable);
+  return m_qualifiers.abstract != TriState::On && (!IsAdt() || m_implementsIPersistable);
 }
 
-bool ClassDef::HasDefaultCtor() const { return CanBeCreated() && OnOr(qualifiers.dc, m_strict); }
+bool ClassDef::HasDefaultCtor() const { return CanBeCreated() && OnOr(m_qualifiers.dc, m_strict); }
 
 bool ClassDef::HasCopy() const {
-  return qualifiers.abstract != TriState::On && !IsAdt() && OnOr(qualifiers.copy, m_strict);
+  return m_qualifiers.abstract != TriState::On && !IsAdt() && OnOr(m_qualifiers.copy, m_strict);
 }
 
-bool ClassDef::HasEquality() const { return qualifiers.compare == TriState::On || IsPureModel() || m_inheritsModel; }
+bool ClassDef::HasEquality() const { return m_qualifiers.compare == TriState::On || IsPureModel() || m_inheritsModel; }
 
 bool ClassDef::AutoGenerateInsertionToXostream() const {
-  if (qualifiers.abstract == TriState::On) return false;
-  return OnOr(qualifiers.os, !IsMixin() && (m_referencedModel || IsPureModel() || m_inheritsModel));
+  if (m_qualifiers.abstract == TriState::On) return false;
+  return OnOr(m_qualifiers.os, !IsMixin() && (m_referencedModel || IsPureModel() || m_inheritsModel));
 }
 
 bool ClassDef::HasPrint() const {
-  return qualifiers.abstract != TriState::On && OnOr(qualifiers.print, AutoGenerateInsertionToXostream());
+  return m_qualifiers.abstract != TriState::On && OnOr(m_qualifiers.print, AutoGenerateInsertionToXostream());
 }
 
 bool ClassDef::HasSerialise() const {
-  return qualifiers.abstract != TriState::On && OnOr(qualifiers.ser, WriteInsertionExtractionInTermsOfSerialise());
+  return m_qualifiers.abstract != TriState::On && OnOr(m_qualifiers.ser, WriteInsertionExtractionInTermsOfSerialise());
 }
 
-bool ClassDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
+bool ClassDef::CanSerialise() const { return OnOr(m_qualifiers.ser, HasSerialise()); }
 
 // Recursion guard: while being computed the answer is false, since a model may contain containers of its own class. Not
 // cached before the body is read, since traits may be written earlier.
@@ -147,8 +147,8 @@ uint32_t ClassDef::TypeOpsBits() const {
 }
 
 bool ClassDef::GenerateOps() const {
-  return qualifiers.genop == TriState::On ||
-         (m_inheritsModel && m_implementsIObject && qualifiers.genop != TriState::Off);
+  return m_qualifiers.genop == TriState::On ||
+         (m_inheritsModel && m_implementsIObject && m_qualifiers.genop != TriState::Off);
 }
 
 int64_t ClassDef::GetNumNonDroppedModelFields() const {
@@ -168,7 +168,7 @@ bool ClassDef::CanSerialiseEmbeddedModel() const {
 }
 
 bool ClassDef::WriteInsertionExtractionInTermsOfSerialise() const {
-  if (qualifiers.ar == TriState::On) return true;
+  if (m_qualifiers.ar == TriState::On) return true;
   if (IsMixin()) return false;
   return CanSerialiseEmbeddedModel() || (m_referencedModel && m_referencedModel->CanSerialiseEmbeddedModel());
 }

@@ -1,4 +1,4 @@
-// $struct, $class, $adt, $mixin and $model are one statement with one data type, told apart by a kind.
+// $struct, $class, $adt, $mixin and $model are one statement with one data type that has a kind.
 #pragma once
 
 #include <cstdint>
@@ -44,25 +44,25 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   void WriteExtraTraits(TextWriter& out) const override;
 
   // --- What it is
-  bool IsAdt() const { return kind == ClassKind::Adt; }
-  bool IsMixin() const { return kind == ClassKind::Mixin; }
-  bool IsPureModel() const { return kind == ClassKind::Model; }
-  bool IsUnderlyingStruct() const { return kind != ClassKind::Class; }
+  bool IsAdt() const { return m_kind == ClassKind::Adt; }
+  bool IsMixin() const { return m_kind == ClassKind::Mixin; }
+  bool IsPureModel() const { return m_kind == ClassKind::Model; }
+  bool IsUnderlyingStruct() const { return m_kind != ClassKind::Class; }
   bool IsTemplate() const { return !m_templateArgList.empty(); }
   // Where its generated members are defined; what depends on template parameters stays in the class.
   Placement MemberPlacement() const;
-  // All of its text stands where the class does, as templates of C++ and members of classes need it: its functions are
+  // All of its text is where the class is, as templates of C++ and members of classes need it: its functions are
   // templates or friends, and its reflection tail is empty.
   bool IsWholeInPlace() const { return WantsCompilableText() && MemberPlacement() == Placement::InClass; }
-  bool ExternalDefinition() const { return qualifiers.extern_ == TriState::On; }
-  bool WriteTraits() const { return qualifiers.traits != TriState::Off && !m_nested && !IsTemplate(); }
+  bool ExternalDefinition() const { return m_qualifiers.extern_ == TriState::On; }
+  bool WriteTraits() const { return m_qualifiers.traits != TriState::Off && !m_nested && !IsTemplate(); }
   std::string_view StructWord() const { return IsUnderlyingStruct() ? "struct " : "class "; }
   const std::string& GetTemplateClassName() const;  // N, or N<argument names>
   std::string TemplateArgs() const;                 // <argument names> or nothing
   std::string TemplateParameters() const;           // "typename BC,typename T", or nothing
   // "template <...>" and what follows it; or nothing.
   std::string TemplatePrefix(std::string_view behind = " ") const;
-  std::string_view FriendWord() const;  // ahead of a function behind the class that stands in another class
+  std::string_view FriendWord() const;  // ahead of a function behind the class that is in another class
   std::string FunctionPrefix() const { return TemplatePrefix().append(FriendWord()); }
 
   // --- What it can do: each answer serves the traits, the TypeOps bits and the members alike
@@ -88,10 +88,10 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   std::string ModelStructName() const;           // N for a named $model, else N_model
   std::string QualifiedModelStructName() const;  // with the enclosing name spaces
 
-  ClassKind kind;
+  ClassKind m_kind;
   bool m_isAnonymous = false;             // a model without a name of its own
-  const ClassDef* m_enclosing = nullptr;  // the class that it stands in; m_nested may be said of others, too
-  ClassQualifiers qualifiers;
+  const ClassDef* m_enclosing = nullptr;  // the class that it is in; m_nested may be said of others, too
+  ClassQualifiers m_qualifiers;
   std::vector<ClassDef*> m_bases;  // plain bases that resolve to a known class
   std::vector<ClassDef*> m_mixins;
   std::vector<ClassDef*> m_postMixinBases;

@@ -50,7 +50,7 @@ inline char BitText(bool value) { return value ? '1' : '0'; }
 
 // Argument lists, all without their parentheses.
 void WriteArgDeclarations(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "T a,U b"
-// "N const* _self,T a,U b": the arguments of a function that stands for a method of N.
+// "N const* _self,T a,U b": the arguments of a function that replaces a method of N.
 void WriteSelfAndArgDeclarations(TextWriter& out, std::string_view className, const FunctionSignature& method);
 void WriteArgNames(TextWriter& out, const std::vector<FunctionArg>& arguments);  // "a,b"
 void WriteReturn(TextWriter& out, const TypeCode& returnType);                   // "return " unless void

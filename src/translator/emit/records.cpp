@@ -5,20 +5,18 @@
 namespace qrex {
 
 void WriteReflectionHead(TextWriter& out, const NameSpaceElement& element) {
-  Write(
-      out, R"(
+  Write(out, R"(
 
     //### $element$
     namespace vesk { XTarget* $target$_GetXTarget(); }
   )",
-      "element"_ = [&] { PrintElement(out, element); }, "target"_ = TargetIdentifier(element));
+        "element"_([&] { PrintElement(out, element); }), "target"_ = TargetIdentifier(element));
 }
 
 void WriteRegistration(TextWriter& out, const NameSpaceElement& element, RegistrationLists& lists) {
   if (!element.m_registered) return;
   lists.registerNames.push_back(element.GetQualifiedName());
-  Write(
-      out, R"(
+  Write(out, R"(
 
     // Registration of $element$
     void _Register_$name$()
@@ -26,8 +24,8 @@ void WriteRegistration(TextWriter& out, const NameSpaceElement& element, Registr
         vxVerify(vesk::RegisterReflected$kind$(&_GetReflected( ($name$*) 0),vesk::$target$_GetXTarget()) == vesk::NSE_OK);
     }
   )",
-      "element"_ = [&] { PrintElement(out, element); }, "name"_ = element.name,
-      "kind"_ = element.GetReflectedKindName(), "target"_ = TargetIdentifier(element));
+        "element"_([&] { PrintElement(out, element); }), "name"_ = element.name,
+        "kind"_ = element.GetReflectedKindName(), "target"_ = TargetIdentifier(element));
 }
 
 void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const FunctionSignature& signature,
@@ -56,19 +54,18 @@ void WriteSignatureArrays(TextWriter& out, const std::string& prefix, const Func
 void WriteSignatureRows(TextWriter& out, const NameSpaceElement& element, const FunctionSignature& signature,
                         const StringTable& strings) {
   const std::string& name = element.name;
-  Write(
-      out, R"(
+  Write(out, R"(
     "$qualifiedName$",
     {$return$},
     $arguments$,
     $metadata$,
     $strings$,
   )",
-      "qualifiedName"_ = element.GetQualifiedName(),
-      "return"_ = NameOrZero(!IsVoid(signature.returnType), name + "_return"),
-      "arguments"_ = CountedName(signature.arguments.size(), name + "_args"),
-      "metadata"_ = NameOrZero(!element.metadata.empty(), name + "_metadata"),
-      "strings"_ = [&] { WriteStringTableName(out, strings, name); });
+        "qualifiedName"_ = element.GetQualifiedName(),
+        "return"_ = NameOrZero(!IsVoid(signature.returnType), name + "_return"),
+        "arguments"_ = CountedName(signature.arguments.size(), name + "_args"),
+        "metadata"_ = NameOrZero(!element.metadata.empty(), name + "_metadata"),
+        "strings"_([&] { WriteStringTableName(out, strings, name); }));
 }
 
 void RecordedElement::WriteReflection(TextWriter& out, RegistrationLists& lists) {
@@ -82,8 +79,7 @@ void RecordedElement::WriteReflection(TextWriter& out, RegistrationLists& lists)
 
 void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element) {
   auto traits = [&] {
-    Write(
-        out, R"(
+    Write(out, R"(
       namespace vesk
       {
       template<> struct TypeTraits<$name$>
@@ -97,10 +93,10 @@ void WriteTypeTraits(TextWriter& out, const NameSpaceElement& element) {
       $extraTraits$
       } // namespace vesk
     )",
-        "name"_ = element.GetQualifiedName(), "exported"_ = BitText(element.m_exported),
-        "reflected"_ = BitText(element.m_reflected), "registered"_ = BitText(element.EffectivelyRegistered()),
-        "kind"_ = element.kindTraits.traits, "metadata"_ = BitText(element.ContainsMetaData()),
-        "extraTraits"_ = [&] { element.WriteExtraTraits(out); });
+          "name"_ = element.GetQualifiedName(), "exported"_ = BitText(element.m_exported),
+          "reflected"_ = BitText(element.m_reflected), "registered"_ = BitText(element.EffectivelyRegistered()),
+          "kind"_ = element.kindTraits.traits, "metadata"_ = BitText(element.ContainsMetaData()),
+          "extraTraits"_([&] { element.WriteExtraTraits(out); }));
   };
   out << "\n";
   WriteOutsideNameSpaces(out, element.parent, traits);

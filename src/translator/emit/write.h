@@ -1,4 +1,4 @@
-// Generated text, written in the emitter as it will stand in the output:
+// Generated text, written in the emitter as it will be in the output:
 //
 //   Write(out, R"(
 //     struct $name$
@@ -6,21 +6,29 @@
 //         $fields$
 //         bool operator==($name$ const& _rhs) const { return true$equalities$; }
 //     };
-//   )", "name"_ = def.name, "fields"_ = [&] { WriteFields(out, def); }, "equalities"_ = equalities);
+//   )", "name"_ = def.name, "fields"_([&] { WriteFields(out, def); }), "equalities"_ = equalities);
 //
 // The first line end, the margin (that of the first line with text) and the blanks of the last line are no part of the
-// text; a text on one line stands as it is. `$name$` is a hole. A hole that is alone on its line writes whole lines,
+// text; a text on one line is taken as it is. `$name$` is a hole. A hole that is alone on its line writes whole lines,
 // indented by the blanks ahead of it: a text that gets its line end, and nothing at all when it is empty, or a function
 // that writes line ends itself. Within a line the further lines of what fills a hole get the blanks of that line. An
-// empty line gets the blanks of the line ahead of it, as within an IndentScope. The text is parsed while compiling: a
+// empty line gets the blanks of the line ahead of it, as within an IndentScope. A function is given by a call, since
+// clang-format would move a text beside `= [&] {...}`. The text is parsed while compiling: a
 // hole without a value or a value without a hole is an error there, named by one of the functions in `emission_error`.
+//
+// What several texts say is given once, and kept as it is then; each text takes of it what it has holes for:
+//
+//   const auto vars = WithVars(out, "name"_ = def.name, "type"_ = TypeText(type));
+//   vars.Write("$type$ $name$() const { return $value$; }\n", "value"_ = value);
 #pragma once
 
 #include <array>
 #include <cstdint>
 #include <string>
 #include <string_view>
+#include <tuple>
 #include <type_traits>
+#include <utility>
 
 #include "text/text_writer.h"
 
@@ -58,6 +66,10 @@ struct NamedHole {
   constexpr Hole<name, T> operator=(const T& value) const {
     return {value};
   }
+  template <typename WriteIt>
+  constexpr Hole<name, WriteIt> operator()(const WriteIt& writeIt) const {
+    return {writeIt};
+  }
 };
 
 template <HoleName name>
@@ -80,8 +92,8 @@ class TextPieces {
   const Piece* begin() const { return m_pieces.data(); }
   const Piece* end() const { return m_pieces.data() + m_count; }
 
-  // `names` ends with an empty one.
-  constexpr TextPieces(const char* raw, const std::string_view* names) : m_names(names) {
+  // `names` ends with an empty one; the text must have holes for the first `required` of them.
+  constexpr TextPieces(const char* raw, const std::string_view* names, size_t required) : m_names(names) {
     std::string_view text(raw);
     size_t margin = 0;
     if (text.starts_with('\n')) {
@@ -96,7 +108,7 @@ class TextPieces {
       AddLine(text.substr(begin, next - begin), margin);
       begin = next;
     }
-    for (size_t hole = 0; !m_names[hole].empty(); ++hole) {
+    for (size_t hole = 0; hole < required; ++hole) {
       if ((m_used >> hole & 1) == 0) emission_error::ValueWithoutHole();
     }
   }
@@ -162,9 +174,9 @@ class TextPieces {
   std::array<Piece, 64> m_pieces{};
 };
 
-template <typename... Holes>
-struct EmittedText {
-  consteval EmittedText(const char* raw) : pieces(raw, kNames) {}
+template <size_t required, typename... Holes>
+struct TextRequiring {
+  consteval TextRequiring(const char* raw) : pieces(raw, kNames, required) {}
 
   static constexpr std::string_view kNames[] = {Holes::kName..., {}};
   const TextPieces pieces;  // no base: clang 14 crashes on a constant of a derived class
@@ -213,13 +225,48 @@ void FillHole(TextWriter& out, const T& value, bool isLine, size_t blanks) {
 }
 
 template <typename... Holes>
-void Write(TextWriter& out, const std::type_identity_t<EmittedText<Holes...>>& text, const Holes&... holes) {
-  for (const auto& piece : text.pieces) {
-    if (piece.length > 0) out << text.pieces.PartOf(piece);
+using EmittedText = TextRequiring<sizeof...(Holes), Holes...>;
+
+template <typename... Holes>
+void WritePieces(TextWriter& out, const TextPieces& pieces, const Holes&... holes) {
+  for (const auto& piece : pieces) {
+    if (piece.length > 0) out << pieces.PartOf(piece);
     if (piece.hole < 0) continue;
     [[maybe_unused]] int index = 0;
     ((index++ == piece.hole ? FillHole(out, holes.value, piece.isLine, piece.blanks) : void()), ...);
   }
+}
+
+template <typename... Holes>
+void Write(TextWriter& out, const std::type_identity_t<EmittedText<Holes...>>& text, const Holes&... holes) {
+  WritePieces(out, text.pieces, holes...);
+}
+
+template <HoleName name, typename T>
+struct KeptHole {
+  static constexpr std::string_view kName = name.View();
+  T value;
+};
+
+template <typename... Kept>
+class VarScope {
+ public:
+  explicit VarScope(TextWriter& out, Kept... kept) : m_out(out), m_kept(std::move(kept)...) {}
+
+  template <typename... Holes>
+  void Write(const std::type_identity_t<TextRequiring<sizeof...(Holes), Holes..., Kept...>>& text,
+             const Holes&... holes) const {
+    std::apply([&](const Kept&... kept) { WritePieces(m_out, text.pieces, holes..., kept...); }, m_kept);
+  }
+
+ private:
+  TextWriter& m_out;
+  std::tuple<Kept...> m_kept;
+};
+
+template <HoleName... names, typename... T>
+auto WithVars(TextWriter& out, const Hole<names, T>&... holes) {
+  return VarScope(out, KeptHole<names, std::decay_t<const T&>>{holes.value}...);
 }
 
 // Fills a hole with all items, each by `writeOne`, with the separator between them.

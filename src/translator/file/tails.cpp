@@ -86,10 +86,9 @@ void WriteProjectRegistration(const ScannedFile& mainFile, const DeclarationRegi
     out << "extern \"C\" " << If(onWindows, windowsSpecifier);
   };
   auto declaration = [&](const Project* dependency) {
-    Write(
-        out, "$linkage$void $keyword$_Project_$name$();\n",
-        "linkage"_ = [&] { linkage(*dependency, "__declspec(dllimport) "); }, "keyword"_ = keyword,
-        "name"_ = dependency->name);
+    Write(out, "$linkage$void $keyword$_Project_$name$();\n",
+          "linkage"_([&] { linkage(*dependency, "__declspec(dllimport) "); }), "keyword"_ = keyword,
+          "name"_ = dependency->name);
   };
   auto call = [&](const Project* dependency) {
     Write(out, "$keyword$_Project_$name$();\n", "keyword"_ = keyword, "name"_ = dependency->name);
@@ -99,8 +98,7 @@ void WriteProjectRegistration(const ScannedFile& mainFile, const DeclarationRegi
       for (const std::string& name : entry.second) write(out, keyword, name);
     });
   };
-  Write(
-      out, R"(
+  Write(out, R"(
 
     $dependencies$
 
@@ -115,10 +113,10 @@ void WriteProjectRegistration(const ScannedFile& mainFile, const DeclarationRegi
         $registrarCalls$
     }
   )",
-      "dependencies"_ = Each(out, dependencies, "", declaration),
-      "registrars"_ = eachRegistrar(WriteRegistrarDeclaration),
-      "linkage"_ = [&] { linkage(project, "_declspec(dllexport) "); }, "keyword"_ = keyword, "name"_ = project.name,
-      "dependencyCalls"_ = Each(out, dependencies, "", call), "registrarCalls"_ = eachRegistrar(WriteRegistrarCall));
+        "dependencies"_ = Each(out, dependencies, "", declaration),
+        "registrars"_ = eachRegistrar(WriteRegistrarDeclaration),
+        "linkage"_([&] { linkage(project, "_declspec(dllexport) "); }), "keyword"_ = keyword, "name"_ = project.name,
+        "dependencyCalls"_ = Each(out, dependencies, "", call), "registrarCalls"_ = eachRegistrar(WriteRegistrarCall));
 }
 
 }  // namespace qrex

@@ -281,10 +281,9 @@ bool CopySource(const ScannedFile& file, const std::string& target) {
   CreateDirectories(target, false);
   file.host.Settings().leftovers.Beside(target);
   const bool readOnly = file.host.Settings().makeTranslatedFilesReadOnly;
-  if (!CopyFile(file.SourcePath(), target, false, readOnly)) {
-    const SystemException failure;
+  if (const platform::Result copied = CopyFile(file.SourcePath(), target, false, readOnly); !copied) {
     TraceWriter() << "ERROR: Copy file " << file.SourcePath() << " to " << target << " failed\n";
-    ReportSystemError(failure);
+    ReportSystemError(copied.Code());
     TraceWriter() << Hint(file.file.project->ListingHint(file.file));
     return false;
   }

@@ -13,34 +13,31 @@ namespace qrex {
 
 namespace {
 
-// The parameters of the function in a table that stands for a method.
+// The parameters of the function in a table that calls a method.
 void WriteTableParameters(TextWriter& out, const FunctionSignature& method) {
-  Write(
-      out, "void$const$* _self$comma$$arguments$", "const"_ = If(method.isConst, " const"),
-      "comma"_ = If(!method.arguments.empty(), ","),
-      "arguments"_ = [&] { WriteArgDeclarations(out, method.arguments); });
+  Write(out, "void$const$* _self$comma$$arguments$", "const"_ = If(method.isConst, " const"),
+        "comma"_ = If(!method.arguments.empty(), ","),
+        "arguments"_([&] { WriteArgDeclarations(out, method.arguments); }));
 }
 
 void WriteTableSlot(TextWriter& out, const FunctionSignature& method) {
-  Write(
-      out, "$type$ (__stdcall *$method$)($parameters$);\n", "type"_ = TypeView(method.returnType),
-      "method"_ = method.name, "parameters"_ = [&] { WriteTableParameters(out, method); });
+  Write(out, "$type$ (__stdcall *$method$)($parameters$);\n", "type"_ = TypeView(method.returnType),
+        "method"_ = method.name, "parameters"_([&] { WriteTableParameters(out, method); }));
 }
 
 void WriteStub(TextWriter& out, const FunctionSignature& method) {
-  Write(
-      out, "static $type$ __stdcall $method$($parameters$) { $return$(($const$T*)_self)->$method$($arguments$); }\n",
-      "type"_ = TypeView(method.returnType), "method"_ = method.name,
-      "parameters"_ = [&] { WriteTableParameters(out, method); }, "return"_ = If(!IsVoid(method.returnType), "return "),
-      "const"_ = If(method.isConst, "const "), "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
+  Write(out, "static $type$ __stdcall $method$($parameters$) { $return$(($const$T*)_self)->$method$($arguments$); }\n",
+        "type"_ = TypeView(method.returnType), "method"_ = method.name,
+        "parameters"_([&] { WriteTableParameters(out, method); }),
+        "return"_ = If(!IsVoid(method.returnType), "return "), "const"_ = If(method.isConst, "const "),
+        "arguments"_([&] { WriteArgNames(out, method.arguments); }));
 }
 
 // `path` leads from the handle's table to that of the base that has the method.
 void WriteForwarder(TextWriter& out, const FunctionSignature& method, std::string_view path) {
-  Write(
-      out, "$signature$ { $return$m_table->$path$$method$(m_self$comma$$arguments$); }\n", "signature"_ = method,
-      "return"_ = If(!IsVoid(method.returnType), "return "), "path"_ = path, "method"_ = method.name,
-      "comma"_ = If(!method.arguments.empty(), ","), "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
+  Write(out, "$signature$ { $return$m_table->$path$$method$(m_self$comma$$arguments$); }\n", "signature"_ = method,
+        "return"_ = If(!IsVoid(method.returnType), "return "), "path"_ = path, "method"_ = method.name,
+        "comma"_ = If(!method.arguments.empty(), ","), "arguments"_([&] { WriteArgNames(out, method.arguments); }));
 }
 
 void WriteForwarders(TextWriter& out, const InterfaceDef& interface,
@@ -85,8 +82,7 @@ void WriteTables(TextWriter& out, const InterfaceDef& interface) {
   auto baseTable = [&](const InterfaceDef* base) {
     Write(out, "$base$::FnTable _$name$;\n", "base"_ = base->GetQualifiedName(), "name"_ = base->name);
   };
-  Write(
-      out, R"(
+  Write(out, R"(
     struct FnTable
     {
         $baseTables$
@@ -111,10 +107,10 @@ void WriteTables(TextWriter& out, const InterfaceDef& interface) {
     template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<$name$*>(this)->m_self = const_cast<T*>(_rhs); const_cast<$name$*>(this)->m_table = &Stubs<T>::GetTable(); }
 
   )",
-      "name"_ = interface.name, "baseTables"_ = Each(out, interface.m_bases, "", baseTable),
-      "slots"_ = Each(out, interface.m_methods, "", [&](const auto& method) { WriteTableSlot(out, method); }),
-      "stubs"_ = Each(out, interface.m_methods, "", [&](const auto& method) { WriteStub(out, method); }),
-      "table"_ = [&] { WriteTable(out, interface); });
+        "name"_ = interface.name, "baseTables"_ = Each(out, interface.m_bases, "", baseTable),
+        "slots"_ = Each(out, interface.m_methods, "", [&](const auto& method) { WriteTableSlot(out, method); }),
+        "stubs"_ = Each(out, interface.m_methods, "", [&](const auto& method) { WriteStub(out, method); }),
+        "table"_([&] { WriteTable(out, interface); }));
 }
 
 // Vectors and classes are reached part by part instead.
@@ -123,10 +119,10 @@ bool HasGetter(TypeView type, NameSpace& root) {
   return type.Op() != kOpClass && type.Op() != kOpVector;
 }
 
-// An attribute has no storage: its struct stands in place of the object's address and calls the methods.
+// An attribute has no storage: its struct is at the place of the object's address and calls the methods.
 void WriteAttributes(TextWriter& out, const InterfaceDef& interface) {
   NameSpace& root = *interface.owner.rootNameSpace;
-  const bool isWhole = interface.WantsCompilableText();  // no methods but Get and Set stand for a value
+  const bool isWhole = interface.WantsCompilableText();  // a value has no methods but Get and Set
   for (const AttributeDef& attribute : interface.m_attributes) {
     if (isWhole && !HasGetter(attribute.type, root)) continue;
     AttributeWriter writer(out, root, isWhole ? Access::GetAndSet : Access::Methods);
@@ -142,8 +138,7 @@ void WriteInterfaceHandle(TextWriter& out, const InterfaceDef& interface) {
     Write(out, "operator $base$() const { return $base$(m_self, &m_table->$path$); }\n",
           "base"_ = flat.base->GetQualifiedName(), "path"_ = flat.path);
   };
-  Write(
-      out, R"(
+  Write(out, R"(
     struct $name$
     {
         $tables$
@@ -159,18 +154,17 @@ void WriteInterfaceHandle(TextWriter& out, const InterfaceDef& interface) {
         FnTable const* m_table;
     };
   )",
-      "name"_ = interface.name, "tables"_ = [&] { WriteTables(out, interface); },
-      "forwarders"_ = [&] { WriteForwarders(out, interface, flattened); },
-      "emptyLine"_ = If(!flattened.empty(), [&] { out << "\n"; }),
-      "conversions"_ = Each(out, flattened, "", conversion), "attributes"_ = [&] { WriteAttributes(out, interface); });
+        "name"_ = interface.name, "tables"_([&] { WriteTables(out, interface); }),
+        "forwarders"_([&] { WriteForwarders(out, interface, flattened); }),
+        "emptyLine"_ = If(!flattened.empty(), [&] { out << "\n"; }),
+        "conversions"_ = Each(out, flattened, "", conversion), "attributes"_([&] { WriteAttributes(out, interface); }));
 }
 
 void WriteInterfaceDeclarations(TextWriter& out, const InterfaceDef& interface) {
   auto delegator = [&](const FunctionSignature& method) {
-    Write(
-        out, "$signature$ { $return$BC::Get$name$().$method$($arguments$); }\n", "signature"_ = method,
-        "return"_ = If(!IsVoid(method.returnType), "return "), "name"_ = interface.name, "method"_ = method.name,
-        "arguments"_ = [&] { WriteArgNames(out, method.arguments); });
+    Write(out, "$signature$ { $return$BC::Get$name$().$method$($arguments$); }\n", "signature"_ = method,
+          "return"_ = If(!IsVoid(method.returnType), "return "), "name"_ = interface.name, "method"_ = method.name,
+          "arguments"_([&] { WriteArgNames(out, method.arguments); }));
   };
   Write(out, R"(
     template <typename BC>
@@ -230,8 +224,7 @@ class InterfaceRecord {
       : m_out(out), m_interface(interface), m_name(interface.name) {}
 
   void WriteFunction() {
-    Write(
-        m_out, R"(
+    Write(m_out, R"(
       $api$vesk::ReflectedInterface const& _GetReflected($name$ const*)
       {
           $metadata$
@@ -244,11 +237,11 @@ class InterfaceRecord {
           return $name$_interface;
       }
     )",
-        "api"_ = ExportPrefix(m_interface), "name"_ = m_name, "metadata"_ = [&] { WriteMetadata(); },
-        "bases"_ = [&] { WriteBases(); }, "signatures"_ = [&] { WriteSignatures(); },
-        "attributes"_ = [&] { WriteAttributeTable(); },
-        "strings"_ = [&] { WriteStringTable(m_out, m_strings, m_name); }, "methods"_ = [&] { WriteMethods(); },
-        "record"_ = [&] { WriteRecord(); });
+          "api"_ = ExportPrefix(m_interface), "name"_ = m_name, "metadata"_([&] { WriteMetadata(); }),
+          "bases"_([&] { WriteBases(); }), "signatures"_([&] { WriteSignatures(); }),
+          "attributes"_([&] { WriteAttributeTable(); }),
+          "strings"_([&] { WriteStringTable(m_out, m_strings, m_name); }), "methods"_([&] { WriteMethods(); }),
+          "record"_([&] { WriteRecord(); }));
   }
 
  private:

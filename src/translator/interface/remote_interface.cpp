@@ -86,8 +86,7 @@ void RemoteText::WriteStub() {
 void RemoteText::WriteStubMethod(const FunctionSignature& method, size_t index) {
   const size_t results = CountResults(method);
   if (results > 0) WriteResultFunction(method);
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     void $method$($parameters$)$const$
     {
         $response$
@@ -95,10 +94,10 @@ void RemoteText::WriteStubMethod(const FunctionSignature& method, size_t index) 
         StubEnd();
     }
   )",
-      "method"_ = method.name, "parameters"_ = [&] { WriteArgDeclarations(m_out, method.arguments); },
-      "const"_ = If(method.isConst, " const"), "response"_ = If(results > 0, [&] { WriteResponse(method, results); }),
-      "index"_ = index, "responseName"_ = results > 0 ? "qr__" : "NULL",
-      "values"_ = [&] { WriteOutgoing(method, " << "); });
+        "method"_ = method.name, "parameters"_([&] { WriteArgDeclarations(m_out, method.arguments); }),
+        "const"_ = If(method.isConst, " const"), "response"_ = If(results > 0, [&] { WriteResponse(method, results); }),
+        "index"_ = index, "responseName"_ = results > 0 ? "qr__" : "NULL",
+        "values"_([&] { WriteOutgoing(method, " << "); }));
 }
 
 void RemoteText::WriteResultFunction(const FunctionSignature& method) {
@@ -153,8 +152,7 @@ void RemoteText::WriteServer() {
     )",
           "name"_ = m_name);
   };
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     struct $kind$$name$ : vesk::$kind$
     {
         $kind$$name$() : vesk::$kind$(Get$kind$ThunkFnTable(),$count$) {}
@@ -163,8 +161,8 @@ void RemoteText::WriteServer() {
         $thunkTable$
     };
   )",
-      "kind"_ = kind, "name"_ = m_name, "count"_ = m_interface.m_methods.size(), "invoke"_ = invoke,
-      "thunks"_ = EachMethod(&RemoteText::WriteThunk), "thunkTable"_ = [&] { WriteThunkTable(kind); });
+        "kind"_ = kind, "name"_ = m_name, "count"_ = m_interface.m_methods.size(), "invoke"_ = invoke,
+        "thunks"_ = EachMethod(&RemoteText::WriteThunk), "thunkTable"_([&] { WriteThunkTable(kind); }));
   WriteFactory(kind);
 }
 
@@ -177,8 +175,7 @@ void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
   };
   auto results = [&] { Write(m_out, "Push()$results$;\n", "results"_ = Each(m_out, method.arguments, "", result)); };
   const bool isReference = !m_interface.m_isRmi && m_interface.WantsCompilableText();  // as a scion's Invoke answers
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     void Thunk$index$()
     {
         $incoming$
@@ -186,9 +183,9 @@ void RemoteText::WriteThunk(const FunctionSignature& method, size_t index) {
         $results$
     }
   )",
-      "index"_ = index, "incoming"_ = [&] { WriteIncoming(method); }, "access"_ = isReference ? "." : "->",
-      "method"_ = method.name, "arguments"_ = Each(m_out, method.arguments, ",", argument),
-      "results"_ = If(CountResults(method) > 0, results));
+        "index"_ = index, "incoming"_([&] { WriteIncoming(method); }), "access"_ = isReference ? "." : "->",
+        "method"_ = method.name, "arguments"_ = Each(m_out, method.arguments, ",", argument),
+        "results"_ = If(CountResults(method) > 0, results));
 }
 
 // The parameters as variables, and the values that came with the call.
@@ -204,14 +201,13 @@ void RemoteText::WriteIncoming(const FunctionSignature& method) {
       Write(m_out, "$type$ $name$;\n", "type"_ = type, "name"_ = arg.name);
     }
   };
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     $variables$
     $pop$$values$;
   )",
-      "pop"_ =
-          arguments.empty() || (nothingComes && m_interface.WantsCompilableText()) ? "Pop()" : "auto _ar = Pop(); _ar",
-      "variables"_ = Each(m_out, method.arguments, "", variable), "values"_ = [&] { WriteOutgoing(method, " >> "); });
+        "pop"_ = arguments.empty() || (nothingComes && m_interface.WantsCompilableText()) ? "Pop()"
+                                                                                          : "auto _ar = Pop(); _ar",
+        "variables"_ = Each(m_out, method.arguments, "", variable), "values"_([&] { WriteOutgoing(method, " >> "); }));
 }
 
 void RemoteText::WriteThunkTable(std::string_view kind) {
@@ -272,12 +268,11 @@ void RemoteText::WriteFactory(std::string_view kind) {
 }  // namespace
 
 void WriteRemoteInterface(TextWriter& out, const InterfaceDef& interface) {
-  Write(
-      out, R"(
+  Write(out, R"(
 
     //### Registration of stub/scion of $interface$
   )",
-      "interface"_ = [&] { PrintElement(out, interface); });
+        "interface"_([&] { PrintElement(out, interface); }));
   NameSpaceFrame frame(out, interface.parent);
   RemoteText text(out, interface);
   text.WriteStub();

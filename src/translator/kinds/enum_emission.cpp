@@ -23,20 +23,18 @@ using WriteRows = void (*)(TextWriter& out, const EnumDef& def);
 
 void WriteTable(TextWriter& out, const EnumDef& def, std::string_view type, std::string_view name,
                 WriteRows writeRows) {
-  Write(
-      out, R"(
+  Write(out, R"(
     static $type$ $name$[] =
     {
         $rows$
     };
   )",
-      "type"_ = type, "name"_ = name, "rows"_ = [&] { writeRows(out, def); });
+        "type"_ = type, "name"_ = name, "rows"_([&] { writeRows(out, def); }));
 }
 
 void WriteTableFunction(TextWriter& out, const EnumDef& def, std::string_view heading, std::string_view type,
                         WriteRows writeRows) {
-  Write(
-      out, R"(
+  Write(out, R"(
     static $heading$()
     {
         static $type$ _s[] =$blank$
@@ -46,7 +44,7 @@ void WriteTableFunction(TextWriter& out, const EnumDef& def, std::string_view he
         return _s;
     }
   )",
-      "heading"_ = heading, "type"_ = type, "blank"_ = " ", "rows"_ = [&] { writeRows(out, def); });
+        "heading"_ = heading, "type"_ = type, "blank"_ = " ", "rows"_([&] { writeRows(out, def); }));
 }
 
 void WriteEnumeration(TextWriter& out, const EnumDef& def, std::string_view name) {
@@ -78,8 +76,7 @@ void WriteTableFunctions(TextWriter& out, const EnumDef& def) {
 
 void WriteEnumClass(TextWriter& out, const EnumDef& def) {
   const bool hasValues = !def.m_values.empty();
-  Write(
-      out, R"(
+  Write(out, R"(
     class $name$ : public vesk::$base$<$name$>
     {
         public:
@@ -90,10 +87,10 @@ void WriteEnumClass(TextWriter& out, const EnumDef& def) {
         $tables$
     };
   )",
-      "name"_ = def.name, "base"_ = hasValues ? "EnumBaseForRefinedLabels" : "EnumBase",
-      "enumeration"_ = [&] { WriteEnumeration(out, def, "Enum"); },
-      "default"_ = hasValues ? def.m_values[def.m_defaultIndex] : static_cast<int64_t>(def.m_defaultIndex),
-      "count"_ = def.m_labels.size(), "tables"_ = [&] { WriteTableFunctions(out, def); });
+        "name"_ = def.name, "base"_ = hasValues ? "EnumBaseForRefinedLabels" : "EnumBase",
+        "enumeration"_([&] { WriteEnumeration(out, def, "Enum"); }),
+        "default"_ = hasValues ? def.m_values[def.m_defaultIndex] : static_cast<int64_t>(def.m_defaultIndex),
+        "count"_ = def.m_labels.size(), "tables"_([&] { WriteTableFunctions(out, def); }));
 }
 
 }  // namespace
@@ -139,8 +136,7 @@ void EnumDef::WriteReflectedDefinition(TextWriter& out) {
   auto nameOf = [&](bool present, std::string_view function, std::string_view array) {
     return NameOrZero(present, name + std::string(m_isClass ? function : array));
   };
-  Write(
-      out, R"(
+  Write(out, R"(
     $api$vesk::ReflectedEnum const& _GetReflected($name$ const*)
     {
         $metadata$
@@ -159,13 +155,13 @@ void EnumDef::WriteReflectedDefinition(TextWriter& out) {
         return $name$_enum;
     }
   )",
-      "api"_ = ExportPrefix(*this), "name"_ = name, "qualifiedName"_ = GetQualifiedName(), "metadata"_ = writeMetadata,
-      "strings"_ = [&] { WriteStringTable(out, strings, name); }, "tables"_ = writeTables,
-      "metadataName"_ = NameOrZero(!metadata.empty(), name + "_metadata"),
-      "stringsName"_ = [&] { WriteStringTableName(out, strings, name); }, "count"_ = m_labels.size(),
-      "labelsName"_ = nameOf(hasLabels, "::stringArray()", "_strings"),
-      "valuesName"_ = nameOf(hasValues, "::valueArray()", "_values"),
-      "enabledName"_ = nameOf(HasDisabledLabel(), "::enabledArray()", "_enabled"));
+        "api"_ = ExportPrefix(*this), "name"_ = name, "qualifiedName"_ = GetQualifiedName(),
+        "metadata"_ = writeMetadata, "strings"_([&] { WriteStringTable(out, strings, name); }), "tables"_ = writeTables,
+        "metadataName"_ = NameOrZero(!metadata.empty(), name + "_metadata"),
+        "stringsName"_([&] { WriteStringTableName(out, strings, name); }), "count"_ = m_labels.size(),
+        "labelsName"_ = nameOf(hasLabels, "::stringArray()", "_strings"),
+        "valuesName"_ = nameOf(hasValues, "::valueArray()", "_values"),
+        "enabledName"_ = nameOf(HasDisabledLabel(), "::enabledArray()", "_enabled"));
 }
 
 }  // namespace qrex

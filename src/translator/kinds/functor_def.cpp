@@ -6,7 +6,7 @@
 namespace qrex {
 
 void FunctorDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
-  CollectNamedTypes(signature, *owner.rootNameSpace, out);
+  CollectNamedTypes(m_signature, *owner.rootNameSpace, out);
 }
 
 }  // namespace qrex

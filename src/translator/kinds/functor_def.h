@@ -14,9 +14,9 @@ class FunctorDef : public RecordedElement {
   bool HaveSomethingToRegister() const override { return true; }
   void WriteReflectedDefinition(TextWriter& out) override;
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
-  bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(signature); }
+  bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(m_signature); }
 
-  FunctionSignature signature;
+  FunctionSignature m_signature;
 };
 
 }  // namespace qrex

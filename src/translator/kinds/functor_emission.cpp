@@ -6,13 +6,12 @@
 namespace qrex {
 
 void WriteSelfSignature(TextWriter& out, const FunctionSignature& signature, std::string_view name) {
-  Write(
-      out, "$result$ $name$($arguments$)", "result"_ = TypeView(signature.returnType), "name"_ = name,
-      "arguments"_ = [&] { WriteSelfAndArgDeclarations(out, "void", signature); });
+  Write(out, "$result$ $name$($arguments$)", "result"_ = TypeView(signature.returnType), "name"_ = name,
+        "arguments"_([&] { WriteSelfAndArgDeclarations(out, "void", signature); }));
 }
 
 void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
-  const FunctionSignature& signature = def.signature;
+  const FunctionSignature& signature = def.m_signature;
   FunctionSignature call = signature;
   call.name = "operator()";
   call.isInline = false;
@@ -21,8 +20,7 @@ void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
     Write(out, "$api$vesk::ReflectedFunctor const& _GetReflected($name$ const*);\n", "api"_ = ExportPrefix(def),
           "name"_ = def.name);
   };
-  Write(
-      out, R"(
+  Write(out, R"(
     class $name$
     {
     public:
@@ -50,19 +48,18 @@ void WriteFunctorClass(TextWriter& out, const FunctorDef& def) {
     $friend$inline vesk::xostream& operator<<(vesk::xostream& os, $name$ f) { f.write(os); return os; }
     $record$
   )",
-      "friend"_ = If(def.m_nested && compilable, "friend "), "name"_ = def.name,
-      "stub"_ = [&] { WriteSelfSignature(out, signature, "(__stdcall *STUB_FN)"); },
-      "call"_ = [&] { WriteSignature(out, call); },
-      "check"_ = If(compilable, "if (!m_stubFn) throw std::logic_error(\"call of a null " + def.name + "\"); "),
-      "return"_ = [&] { WriteReturn(out, signature.returnType); }, "comma"_ = signature.arguments.empty() ? "" : ",",
-      "arguments"_ = [&] { WriteArgNames(out, signature.arguments); },
-      "record"_ = If(compilable && def.m_reflected && !def.m_nested, writeRecord));
+        "friend"_ = If(def.m_nested && compilable, "friend "), "name"_ = def.name,
+        "stub"_([&] { WriteSelfSignature(out, signature, "(__stdcall *STUB_FN)"); }),
+        "call"_([&] { WriteSignature(out, call); }),
+        "check"_ = If(compilable, "if (!m_stubFn) throw std::logic_error(\"call of a null " + def.name + "\"); "),
+        "return"_([&] { WriteReturn(out, signature.returnType); }), "comma"_ = signature.arguments.empty() ? "" : ",",
+        "arguments"_([&] { WriteArgNames(out, signature.arguments); }),
+        "record"_ = If(compilable && def.m_reflected && !def.m_nested, writeRecord));
 }
 
 void FunctorDef::WriteReflectedDefinition(TextWriter& out) {
   StringTable strings;
-  Write(
-      out, R"(
+  Write(out, R"(
     $api$vesk::ReflectedFunctor const& _GetReflected($name$ const*)
     {
         $arrays$
@@ -74,10 +71,10 @@ void FunctorDef::WriteReflectedDefinition(TextWriter& out) {
         return $name$_functor;
     }
   )",
-      "api"_ = ExportPrefix(*this), "name"_ = name,
-      "arrays"_ = [&] { WriteSignatureArrays(out, name, signature, strings); },
-      "strings"_ = [&] { WriteStringTable(out, strings, name); },
-      "rows"_ = [&] { WriteSignatureRows(out, *this, signature, strings); });
+        "api"_ = ExportPrefix(*this), "name"_ = name,
+        "arrays"_([&] { WriteSignatureArrays(out, name, m_signature, strings); }),
+        "strings"_([&] { WriteStringTable(out, strings, name); }),
+        "rows"_([&] { WriteSignatureRows(out, *this, m_signature, strings); }));
 }
 
 }  // namespace qrex

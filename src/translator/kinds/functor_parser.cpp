@@ -20,9 +20,9 @@ void ParseFunctor(QrexParser& parser, bool nested) {
     parser.ParseQualifiers(def);
     parser.CheckRedundant(def);
   }
-  def.signature = parser.ParseFunctionSignature({.reflected = def.m_reflected});
-  def.name = def.signature.name;
-  def.metadata = def.signature.metadata;
+  def.m_signature = parser.ParseFunctionSignature({.reflected = def.m_reflected});
+  def.name = def.m_signature.name;
+  def.metadata = def.m_signature.metadata;
   if (NameSpaceElement* found = parser.Current().Lookup(def.name)) parser.FailConflict("functor", def.name, *found);
   def.ForgetQualifiedName();
   parser.Current().Add(std::move(made));
@@ -94,14 +94,13 @@ class MakeFunctor {
     }
   }
 
-  const FunctionSignature& Signature() const { return m_functor->signature; }
+  const FunctionSignature& Signature() const { return m_functor->m_signature; }
 
   void WriteDelegate() { WriteSelfSignature(m_out, Signature(), "__stdcall static_delegate"); }
   void WriteBody() { m_out << m_body << "\n"; }
 
   void WritePlain() {
-    Write(
-        m_out, R"(
+    Write(m_out, R"(
       struct $name$_delegator
       {
           static $delegate$
@@ -111,13 +110,12 @@ class MakeFunctor {
       };
 
       $functor$ $name$(NULL,$name$_delegator::static_delegate);)",
-        "name"_ = m_name, "delegate"_ = [&] { WriteDelegate(); }, "body"_ = [&] { WriteBody(); },
-        "functor"_ = m_functor->GetQualifiedName());
+          "name"_ = m_name, "delegate"_([&] { WriteDelegate(); }), "body"_([&] { WriteBody(); }),
+          "functor"_ = m_functor->GetQualifiedName());
   }
 
   void WriteBound() {
-    Write(
-        m_out, R"(
+    Write(m_out, R"(
       struct $name$_delegator : public $base$
       {
           $result$ member_delegate($parameters$)$methodConst$$const$
@@ -131,13 +129,14 @@ class MakeFunctor {
       };
 
       $functor$ $name$($object$,$name$_delegator::static_delegate);)",
-        "name"_ = m_name, "base"_ = m_base, "result"_ = TypeView(Signature().returnType),
-        "parameters"_ = [&] { WriteArgDeclarations(m_out, Signature().arguments); },
-        "methodConst"_ = Signature().isConst ? " const" : "", "const"_ = m_isConst ? " const" : "",
-        "body"_ = [&] { WriteBody(); }, "delegate"_ = [&] { WriteDelegate(); },
-        "return"_ = [&] { WriteReturn(m_out, Signature().returnType); },
-        "arguments"_ = [&] { WriteArgNames(m_out, Signature().arguments); }, "functor"_ = m_functor->GetQualifiedName(),
-        "object"_ = m_isConst ? "const_cast<" + m_base + "*>(" + m_object + ")" : m_object);
+          "name"_ = m_name, "base"_ = m_base, "result"_ = TypeView(Signature().returnType),
+          "parameters"_([&] { WriteArgDeclarations(m_out, Signature().arguments); }),
+          "methodConst"_ = Signature().isConst ? " const" : "", "const"_ = m_isConst ? " const" : "",
+          "body"_([&] { WriteBody(); }), "delegate"_([&] { WriteDelegate(); }),
+          "return"_([&] { WriteReturn(m_out, Signature().returnType); }),
+          "arguments"_([&] { WriteArgNames(m_out, Signature().arguments); }),
+          "functor"_ = m_functor->GetQualifiedName(),
+          "object"_ = m_isConst ? "const_cast<" + m_base + "*>(" + m_object + ")" : m_object);
   }
 
   QrexParser& m_parser;

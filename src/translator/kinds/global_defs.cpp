@@ -9,7 +9,7 @@
 namespace qrex {
 
 void GlobalFunctionDef::CollectReferences(std::vector<const NameSpaceElement*>& out) const {
-  CollectNamedTypes(signature, *owner.rootNameSpace, out);
+  CollectNamedTypes(m_signature, *owner.rootNameSpace, out);
 }
 
 void GlobalDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
@@ -18,14 +18,13 @@ void GlobalDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
   NameSpaceFrame frame(out, parent);
   IndentScope indent(out, 4);
   lists.registerNames.push_back(GetQualifiedName());
-  Write(
-      out, R"(
+  Write(out, R"(
     void _Register_$name$()
     {
         $definition$
     }
   )",
-      "name"_ = name, "definition"_ = [&] { WriteReflectedDefinition(out); });
+        "name"_ = name, "definition"_([&] { WriteReflectedDefinition(out); }));
 }
 
 namespace {
@@ -45,8 +44,7 @@ void WriteTypedDefinition(TextWriter& out, const NameSpaceElement& element, cons
   StringTable strings;
   WriteTypeByteCode(out, name + "_type", strings, type);
   WriteStringTable(out, strings, name);
-  Write(
-      out, R"(
+  Write(out, R"(
     static const vesk::Reflected$kind$ $record$ =
     {
         "$qualifiedName$",
@@ -56,19 +54,18 @@ void WriteTypedDefinition(TextWriter& out, const NameSpaceElement& element, cons
     };
     $register$
   )",
-      "kind"_ = element.GetReflectedKindName(), "record"_ = record, "qualifiedName"_ = element.GetQualifiedName(),
-      "address"_ = address, "name"_ = name, "strings"_ = NameOrZero(!strings.Empty(), name + "_stringTable"),
-      "register"_ = [&] { WriteRegister(out, element, record); });
+        "kind"_ = element.GetReflectedKindName(), "record"_ = record, "qualifiedName"_ = element.GetQualifiedName(),
+        "address"_ = address, "name"_ = name, "strings"_ = NameOrZero(!strings.Empty(), name + "_stringTable"),
+        "register"_([&] { WriteRegister(out, element, record); }));
 }
 
 }  // namespace
 
 void GlobalFunctionDef::WriteReflectedDefinition(TextWriter& out) {
   StringTable strings;
-  WriteSignatureArrays(out, name, signature, strings, "_arg_");
+  WriteSignatureArrays(out, name, m_signature, strings, "_arg_");
   WriteStringTable(out, strings, name);
-  Write(
-      out, R"(
+  Write(out, R"(
     static const vesk::ReflectedGlobalFunction $name$_function =
     {
         $rows$
@@ -76,19 +73,19 @@ void GlobalFunctionDef::WriteReflectedDefinition(TextWriter& out) {
     };
     $register$
   )",
-      "name"_ = name, "rows"_ = [&] { WriteSignatureRows(out, *this, signature, strings); },
-      "result"_ = TypeView(signature.returnType),
-      "arguments"_ = [&] { WriteArgDeclarations(out, signature.arguments); },
-      "const"_ = signature.isConst ? " const" : "", "qualifiedName"_ = GetQualifiedName(),
-      "register"_ = [&] { WriteRegister(out, *this, name + "_function"); });
+        "name"_ = name, "rows"_([&] { WriteSignatureRows(out, *this, m_signature, strings); }),
+        "result"_ = TypeView(m_signature.returnType),
+        "arguments"_([&] { WriteArgDeclarations(out, m_signature.arguments); }),
+        "const"_ = m_signature.isConst ? " const" : "", "qualifiedName"_ = GetQualifiedName(),
+        "register"_([&] { WriteRegister(out, *this, name + "_function"); }));
 }
 
 void GlobalVarDef::WriteReflectedDefinition(TextWriter& out) {
-  WriteTypedDefinition(out, *this, type, name + "_var", "&" + name + ",");
+  WriteTypedDefinition(out, *this, m_type, name + "_var", "&" + name + ",");
 }
 
 void TypedefDef::WriteReflectedDefinition(TextWriter& out) {
-  WriteTypedDefinition(out, *this, type, name + "_typedef", "");
+  WriteTypedDefinition(out, *this, m_type, name + "_typedef", "");
 }
 
 }  // namespace qrex

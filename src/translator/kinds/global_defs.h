@@ -21,9 +21,9 @@ class GlobalFunctionDef : public GlobalDef {
   bool HaveSomethingToRegister() const override { return status == DeclStatus::Defined && m_registered; }
   void WriteReflectedDefinition(TextWriter& out) override;
   void CollectReferences(std::vector<const NameSpaceElement*>& out) const override;
-  bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(signature); }
+  bool ContainsMetaData() const override { return !metadata.empty() || SignatureHasMetadata(m_signature); }
 
-  FunctionSignature signature;
+  FunctionSignature m_signature;
 };
 
 class GlobalVarDef : public GlobalDef {
@@ -34,9 +34,9 @@ class GlobalVarDef : public GlobalDef {
   bool HaveSomethingToRegister() const override { return m_registered; }
   void WriteReflectedDefinition(TextWriter& out) override;
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
-  bool ContainsMetaData() const override { return !metadata.empty() || HasMetadata(type); }
+  bool ContainsMetaData() const override { return !metadata.empty() || HasMetadata(m_type); }
 
-  TypeCode type;
+  TypeCode m_type;
 };
 
 class TypedefDef : public GlobalDef, public TypedefTarget {
@@ -47,10 +47,10 @@ class TypedefDef : public GlobalDef, public TypedefTarget {
   bool HaveSomethingToRegister() const override { return m_reflected; }
   void WriteReflectedDefinition(TextWriter& out) override;
   void CollectReferences(std::vector<const NameSpaceElement*>&) const override {}
-  bool ContainsMetaData() const override { return !metadata.empty() || HasMetadata(type); }
-  const TypeCode& TargetType() const override { return type; }
+  bool ContainsMetaData() const override { return !metadata.empty() || HasMetadata(m_type); }
+  const TypeCode& TargetType() const override { return m_type; }
 
-  TypeCode type;
+  TypeCode m_type;
 };
 
 }  // namespace qrex

@@ -21,13 +21,13 @@ std::string SignatureText(const FunctionSignature& signature) {
 bool SameSignature(const GlobalFunctionDef& a, const GlobalFunctionDef& b) {
   NameSpace& rootA = *a.owner.rootNameSpace;
   NameSpace& rootB = *b.owner.rootNameSpace;
-  const auto& argumentsA = a.signature.arguments;
-  const auto& argumentsB = b.signature.arguments;
+  const auto& argumentsA = a.m_signature.arguments;
+  const auto& argumentsB = b.m_signature.arguments;
   if (argumentsA.size() != argumentsB.size()) return false;
   for (size_t i = 0; i < argumentsA.size(); ++i) {
     if (!SameType(argumentsA[i].type, rootA, argumentsB[i].type, rootB)) return false;
   }
-  return SameType(a.signature.returnType, rootA, b.signature.returnType, rootB);
+  return SameType(a.m_signature.returnType, rootA, b.m_signature.returnType, rootB);
 }
 
 void CopyFunctionBody(QrexParser& parser, const std::string& name, const char* statement) {
@@ -55,7 +55,7 @@ void CopyFunctionBody(QrexParser& parser, const std::string& name, const char* s
 
 void CheckFunctionDefinition(QrexParser& parser, const GlobalFunctionDef& def, const GlobalFunctionDef* old) {
   if (old && old->status == DeclStatus::Defined) parser.FailRepeated(*old, def);
-  const bool isInline = def.signature.isInline;
+  const bool isInline = def.m_signature.isInline;
   if (parser.file.file.kind == FileKind::H && !isInline) {
     parser.ReportWarning(1011, PrintedElement(def) + " is defined in a header file and isn't inlined", &def);
   }
@@ -73,9 +73,9 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
   parser.ParseExportModifier(def);
   const char* const statement = parser.current.text.begin;
   if (parser.Is(kShiftLeft)) parser.ParseQualifiers(def);
-  def.signature = parser.ParseFunctionSignature({.polymorphic = polymorphic, .reflected = def.m_reflected});
-  def.name = def.signature.name;
-  def.metadata = def.signature.metadata;
+  def.m_signature = parser.ParseFunctionSignature({.polymorphic = polymorphic, .reflected = def.m_reflected});
+  def.name = def.m_signature.name;
+  def.metadata = def.m_signature.metadata;
   def.parent = &parser.Current();
   parser.CheckNotExported(def);
   GlobalFunctionDef* old = nullptr;
@@ -84,12 +84,12 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
     old = static_cast<GlobalFunctionDef*>(found);
   }
   parser.Current().Add(std::move(made));
-  if (!def.signature.isInline) parser.out << ExportPrefix(def);
-  WriteSignature(parser.out, def.signature);
+  if (!def.m_signature.isInline) parser.out << ExportPrefix(def);
+  WriteSignature(parser.out, def.m_signature);
   if (old && parser.WarningOn(1010) && !SameSignature(def, *old)) {
     parser.ReportWarning(1010,
                          PrintedElement(def) + " declarations have inconsistent signatures :\n    " +
-                             SignatureText(def.signature) + "\n    " + SignatureText(old->signature) + "\n",
+                             SignatureText(def.m_signature) + "\n    " + SignatureText(old->m_signature) + "\n",
                          &def);
     parser.SeeDeclaration(*old);
   }
@@ -193,7 +193,7 @@ Def& AddDeclared(QrexParser& parser, const DeclaredFlags& flags, const Declarati
   auto made = std::make_unique<Def>(parser.file, parser.SourcePosition());
   Def& def = *made;
   def.name = declaration.parsed.name;
-  def.type = declaration.parsed.type;
+  def.m_type = declaration.parsed.type;
   flags.Set(def);
   parser.Current().Add(std::move(made));
   return def;

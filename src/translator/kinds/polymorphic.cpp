@@ -16,9 +16,9 @@ constexpr size_t kMaxLevels = 100, kMaxLeaves = 100000;
 class Dispatch {
  public:
   Dispatch(QrexParser& parser, const GlobalFunctionDef& def)
-      : m_out(parser.out), m_def(def), m_isVoid(IsVoid(def.signature.returnType)) {
+      : m_out(parser.out), m_def(def), m_isVoid(IsVoid(def.m_signature.returnType)) {
     size_t leaves = 1;
-    for (const FunctionArg& argument : def.signature.arguments) {
+    for (const FunctionArg& argument : def.m_signature.arguments) {
       if (!argument.polymorphic) continue;
       const VariantDef* variant = VariantOf(argument);
       if (!variant || variant->m_items.empty()) {
@@ -86,8 +86,8 @@ class Dispatch {
   void WriteCall() {
     m_out << (m_isVoid ? "" : "return ") << m_def.name << "(";
     auto level = m_levels.begin();
-    for (const FunctionArg& argument : m_def.signature.arguments) {
-      if (&argument != &m_def.signature.arguments.front()) m_out << ",";
+    for (const FunctionArg& argument : m_def.m_signature.arguments) {
+      if (&argument != &m_def.m_signature.arguments.front()) m_out << ",";
       m_out << argument.name;
       if (!argument.polymorphic) continue;
       m_out << ".as<" << ItemName(*level->variant, *level->variant->m_items[level->item]) << ">()";
@@ -96,7 +96,7 @@ class Dispatch {
     m_out << (m_isVoid ? "); break;\n" : ");\n");
   }
 
-  // The struct of a named item stands in the class of the variant.
+  // The struct of a named item is in the class of the variant.
   std::string ItemName(const VariantDef& variant, const VariantItem& item) const {
     const bool inVariant = item.IsNamed() && m_def.WantsCompilableText();
     return (inVariant ? variant.GetQualifiedName() + "::" : "") + item.EffectiveName();

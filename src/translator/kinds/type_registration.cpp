@@ -56,8 +56,7 @@ void WriteTypeRegistration(TextWriter& out, const TypeRegistration& registration
 
   NameSpaceFrame frame(out, registration.scope);
   StringTable strings;
-  Write(
-      out, R"(
+  Write(out, R"(
     vesk::ReflectionByteCode _GetReflected($type$ const*)
     {
         $byteCode$
@@ -77,10 +76,10 @@ void WriteTypeRegistration(TextWriter& out, const TypeRegistration& registration
         vxVerify(vesk::RegisterTypeOps(vesk::ReflectionByteCodeValue(_GetReflected(($type$*)0)),&_GetTypeOps(($type$*)0)));
     }
   )",
-      "type"_ = type, "byteCode"_ = [&] { WriteTypeByteCode(out, "bc", strings, registration.code); },
-      "strings"_ = [&] { WriteStringTable(out, strings, ""); },
-      "stringsName"_ = [&] { out << (strings.Empty() ? "NULL" : "_stringTable"); },
-      "typeOps"_ = [&] { WriteTypeOps(out, type, kOpsAll); }, "mangled"_ = mangled);
+        "type"_ = type, "byteCode"_([&] { WriteTypeByteCode(out, "bc", strings, registration.code); }),
+        "strings"_([&] { WriteStringTable(out, strings, ""); }),
+        "stringsName"_([&] { out << (strings.Empty() ? "NULL" : "_stringTable"); }),
+        "typeOps"_([&] { WriteTypeOps(out, type, kOpsAll); }), "mangled"_ = mangled);
 }
 
 }  // namespace qrex

@@ -59,7 +59,7 @@ bool VariantDef::AllVoid() const {
 
 // An item under test counts as passing, so a recursive variant terminates.
 bool VariantDef::HasSerialise() const {
-  if (qualifiers.ar != TriState::Unset) return qualifiers.ar == TriState::On;
+  if (m_qualifiers.ar != TriState::Unset) return m_qualifiers.ar == TriState::On;
   if (m_hasSerialise == Memo::NotComputed) {
     m_hasSerialise = Memo::BeingComputed;
     NameSpace& root = *owner.rootNameSpace;
@@ -74,7 +74,7 @@ bool VariantDef::HasSerialise() const {
   return m_hasSerialise != Memo::No;
 }
 
-bool VariantDef::CanSerialise() const { return OnOr(qualifiers.ser, HasSerialise()); }
+bool VariantDef::CanSerialise() const { return OnOr(m_qualifiers.ser, HasSerialise()); }
 
 bool VariantDef::ItemVisits(const VariantItem& item, bool (*test)(TypeView, NameSpace&)) const {
   NameSpace& root = *owner.rootNameSpace;
@@ -105,11 +105,11 @@ std::string_view VariantDef::NamedVoidItem() const {
 
 uint32_t VariantDef::TypeOpsBits() const {
   uint32_t bits = kOpsDestruct;
-  if (qualifiers.compare != TriState::Off) bits |= kOpsEqual | kOpsLess;
-  if (qualifiers.print != TriState::Off) bits |= kOpsPrint;
+  if (m_qualifiers.compare != TriState::Off) bits |= kOpsEqual | kOpsLess;
+  if (m_qualifiers.print != TriState::Off) bits |= kOpsPrint;
   if (CanSerialise()) bits |= kOpsSerialise;
   if (m_hasDefault) bits |= kOpsConstruct;
-  if (qualifiers.copy != TriState::Off) bits |= kOpsCopy;
+  if (m_qualifiers.copy != TriState::Off) bits |= kOpsCopy;
   if (IsIObjectVisitable()) bits |= kOpsVisitObjects;
   if (IsPrefVisitable()) bits |= kOpsVisitPrefs;
   return bits;

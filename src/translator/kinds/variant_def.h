@@ -43,7 +43,7 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
   bool IsPrefVisitable() const override;
   bool ItemVisits(const VariantItem& item, bool (*test)(TypeView, NameSpace&)) const;
   bool AllVoid() const;
-  bool WritesToStream() const { return qualifiers.os != TriState::Off; }
+  bool WritesToStream() const { return m_qualifiers.os != TriState::Off; }
   uint32_t TypeOpsBits() const;
   // Where its members are defined. Behind a nested class there is no place for them but within the enclosing one.
   Placement MemberPlacement() const {
@@ -51,7 +51,7 @@ class VariantDef : public RecordedElement, public TypeBehaviour {
   }
 
   bool m_hasDefault = false;
-  ClassQualifiers qualifiers;
+  ClassQualifiers m_qualifiers;
   std::vector<std::unique_ptr<VariantItem>> m_items;
 
  private:

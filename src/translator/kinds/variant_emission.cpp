@@ -247,8 +247,7 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
     Write(out, "bool is($name$*) const { return _tag == $tag$; }\n", "name"_ = item->EffectiveName(),
           "tag"_ = item->tag);
   };
-  Write(
-      out, R"(
+  Write(out, R"(
     $itemTypes$
     template<typename $T$$any$> struct _mapvalue_ { enum { tag=$T$::tag }; typedef typename $T$::Value Value; };
     $mapValues$
@@ -270,20 +269,20 @@ void WriteVariantBody(TextWriter& out, const VariantDef& def) {
     vesk::int32 _tag;
     $data$
   )",
-      "name"_ = def.name, "itemTypes"_ = Each(out, def.m_items, "", writeItemType), "T"_ = ParameterOf(def),
-      "any"_ = If(inClass, ",typename=void"), "mapValues"_ = If(inClass, [&] { WriteMapValues(out, def); }),
-      "constructors"_ = Each(out, def.m_items, "", writeConstructor),
-      "copying"_ = declared(def.name + "(" + def.name + " const& _rhs);\n" + moving + "~" + def.name + "();"),
-      "assignment"_ = [&] { WriteAssignment(out, def); },
-      "visiting"_ =
-          declared("void VisitObjects(vesk::IObjectVisitor&) const;\nvoid VisitPrefs(vesk::IPrefVisitor&) const;"),
-      "equal"_ = declared("bool operator==(" + def.name + " const& _rhs) const;"),
-      "less"_ = declared("bool operator<(" + def.name + " const& _rhs) const;"),
-      "members"_ = If(inClass, [&] { WriteVariantMembers(out, def); }),
-      "operations"_ = [&] { WriteOperationDeclarations(out, def); }, "accesses"_ = [&] { WriteAccesses(out, def); },
-      "tests"_ = Each(out, def.m_items, "", writeTest),
-      "ofTag"_ = declaresReading ? def.name + "(vesk::int32 _new,vesk::NullInterface);" : "",
-      "data"_ = [&] { WriteData(out, def); });
+        "name"_ = def.name, "itemTypes"_ = Each(out, def.m_items, "", writeItemType), "T"_ = ParameterOf(def),
+        "any"_ = If(inClass, ",typename=void"), "mapValues"_ = If(inClass, [&] { WriteMapValues(out, def); }),
+        "constructors"_ = Each(out, def.m_items, "", writeConstructor),
+        "copying"_ = declared(def.name + "(" + def.name + " const& _rhs);\n" + moving + "~" + def.name + "();"),
+        "assignment"_([&] { WriteAssignment(out, def); }),
+        "visiting"_ =
+            declared("void VisitObjects(vesk::IObjectVisitor&) const;\nvoid VisitPrefs(vesk::IPrefVisitor&) const;"),
+        "equal"_ = declared("bool operator==(" + def.name + " const& _rhs) const;"),
+        "less"_ = declared("bool operator<(" + def.name + " const& _rhs) const;"),
+        "members"_ = If(inClass, [&] { WriteVariantMembers(out, def); }),
+        "operations"_([&] { WriteOperationDeclarations(out, def); }), "accesses"_([&] { WriteAccesses(out, def); }),
+        "tests"_ = Each(out, def.m_items, "", writeTest),
+        "ofTag"_ = declaresReading ? def.name + "(vesk::int32 _new,vesk::NullInterface);" : "",
+        "data"_([&] { WriteData(out, def); }));
 }
 
 // --- Behind the class

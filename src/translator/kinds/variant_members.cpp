@@ -154,8 +154,10 @@ class VariantMembers {
     return [this, operation] { WriteSwitch(operation); };
   }
 
+  auto Vars() const { return WithVars(m_out, "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name); }
+
   void WriteCopying() {
-    Write(m_out, R"(
+    Vars().Write(R"(
       $inline$$scope$$name$($name$ const& _rhs)
       {
           _tag = _rhs._tag;
@@ -166,13 +168,12 @@ class VariantMembers {
           $destroy$
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "copy"_ = Switch(Operation::Copy),
-          "destroy"_ = Switch(Operation::Destroy));
+                 "copy"_ = Switch(Operation::Copy), "destroy"_ = Switch(Operation::Destroy));
   }
 
   // The tag comes last: until then there is nothing to destroy.
   void WriteMaking() {
-    Write(m_out, R"(
+    Vars().Write(R"(
       $inline$$scope$$name$($name$&& _rhs) noexcept($noexcept$)
       {
           const vesk::int32 _new = _rhs._tag;
@@ -181,10 +182,9 @@ class VariantMembers {
           _tag = _new;
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "noexcept"_ = NoexceptText(m_def),
-          "move"_ = Switch(Operation::Move));
+                 "noexcept"_ = NoexceptText(m_def), "move"_ = Switch(Operation::Move));
     if (!m_def.HasSerialise()) return;
-    Write(m_out, R"(
+    Vars().Write(R"(
       $inline$$scope$$name$(vesk::int32 _new,vesk::NullInterface)
       {
           _tag = -1;
@@ -192,11 +192,11 @@ class VariantMembers {
           _tag = _new;
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "make"_ = Switch(Operation::Make));
+                 "make"_ = Switch(Operation::Make));
   }
 
   void WriteComparisons() {
-    Write(m_out, R"(
+    Vars().Write(R"(
       $inline$bool $scope$operator==($name$ const& _rhs) const
       {
           if (_tag != _rhs._tag) return false;
@@ -211,22 +211,21 @@ class VariantMembers {
           return false;
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "name"_ = m_name, "equal"_ = Switch(Operation::Equal),
-          "less"_ = Switch(Operation::Less));
+                 "equal"_ = Switch(Operation::Equal), "less"_ = Switch(Operation::Less));
   }
 
   void WriteStreamWrite() {
-    Write(m_out, R"(
+    Vars().Write(R"(
       $inline$void $scope$Write(vesk::xostream& _os) const
       {
           $print$
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "print"_ = Switch(Operation::Print));
+                 "print"_ = Switch(Operation::Print));
   }
 
   void WriteVisits() {
-    Write(m_out, R"(
+    Vars().Write(R"(
       $inline$void $scope$VisitObjects(vesk::IObjectVisitor& _v) const
       {
           $visitObjects$
@@ -236,13 +235,11 @@ class VariantMembers {
           $visitPrefs$
       }
     )",
-          "inline"_ = m_inline, "scope"_ = m_scope, "visitObjects"_ = Switch(Operation::VisitObjects),
-          "visitPrefs"_ = Switch(Operation::VisitPrefs));
+                 "visitObjects"_ = Switch(Operation::VisitObjects), "visitPrefs"_ = Switch(Operation::VisitPrefs));
   }
 
   void WriteArchives() {
-    Write(
-        m_out, R"(
+    Vars().Write(R"(
       template<typename Archive> $inline$void $scope$Serialise(Archive& _ar) const
       {
           vesk::SerialiseVariableLengthUint(_ar,_tag);
@@ -253,19 +250,19 @@ class VariantMembers {
           $deserialise$
       }
     )",
-        "inline"_ = m_inline, "scope"_ = m_scope, "serialise"_ = Switch(Operation::Serialise),
-        "deserialise"_ = [this] { MakesValueFirst(m_def) ? WriteReading() : WriteReadingInPlace(); });
+                 "serialise"_ = Switch(Operation::Serialise),
+                 "deserialise"_([this] { MakesValueFirst(m_def) ? WriteReading() : WriteReadingInPlace(); }));
   }
 
   void WriteReading() {
-    Write(m_out, R"(
+    Vars().Write(R"(
       vesk::int32 _new;
       vesk::DeserialiseVariableLengthUint(_ar,_new);
       $name$ _value(_new,vesk::null);
       $read$
       *this = std::move(_value);
     )",
-          "name"_ = m_name, "read"_ = Switch(Operation::Read));
+                 "read"_ = Switch(Operation::Read));
   }
 
   void WriteReadingInPlace() {

@@ -63,7 +63,7 @@ void VariantStatement::ReadQualifiers() {
                                [&](bool on) {
                                  const QualifierWord* word = FindQualifierWord(m_parser.current.text.View());
                                  if (!word || !word->onVariant) return false;
-                                 m_def->qualifiers.*word->state = on ? TriState::On : TriState::Off;
+                                 m_def->m_qualifiers.*word->state = on ? TriState::On : TriState::Off;
                                  redundant = redundant || word->needsReflection;
                                  return true;
                                });

@@ -21,8 +21,7 @@ void VariantDef::WriteReflectedDefinition(TextWriter& out) {
     )",
           "item"_ = item->EffectiveName(), "type"_ = item->isStruct ? "NULL" : name + "_" + item->MangledTagName());
   };
-  Write(
-      out, R"(
+  Write(out, R"(
     $api$vesk::ReflectedVariant const& _GetReflected($name$ const*)
     {
         $metadata$
@@ -50,13 +49,13 @@ void VariantDef::WriteReflectedDefinition(TextWriter& out) {
         return vesk::GetReflectedVariant<$name$>().m_ops;
     }
   )",
-      "api"_ = ExportPrefix(*this), "name"_ = name, "qualifiedName"_ = GetQualifiedName(), "metadata"_ = writeMetadata,
-      "types"_ = Each(out, m_items, "", writeType), "rows"_ = Each(out, m_items, "", writeRow),
-      "strings"_ = [&] { WriteStringTable(out, strings, name); },
-      "metadataName"_ = NameOrZero(!metadata.empty(), name + "_metadata"),
-      "fieldsName"_ = CountedName(m_items.size(), name + "_fields"),
-      "stringsName"_ = [&] { WriteStringTableName(out, strings, name); },
-      "typeOps"_ = [&] { WriteTypeOps(out, name, TypeOpsBits()); });
+        "api"_ = ExportPrefix(*this), "name"_ = name, "qualifiedName"_ = GetQualifiedName(),
+        "metadata"_ = writeMetadata, "types"_ = Each(out, m_items, "", writeType),
+        "rows"_ = Each(out, m_items, "", writeRow), "strings"_([&] { WriteStringTable(out, strings, name); }),
+        "metadataName"_ = NameOrZero(!metadata.empty(), name + "_metadata"),
+        "fieldsName"_ = CountedName(m_items.size(), name + "_fields"),
+        "stringsName"_([&] { WriteStringTableName(out, strings, name); }),
+        "typeOps"_([&] { WriteTypeOps(out, name, TypeOpsBits()); }));
 }
 
 }  // namespace qrex

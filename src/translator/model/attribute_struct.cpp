@@ -34,25 +34,6 @@ bool IsForwardedScalar(TypeOp op) {
 
 }  // namespace
 
-bool IsVectorLike(TypeView type) {
-  return type.Op() == kOpVector || type.Op() == kOpString8 || type.Op() == kOpString16;
-}
-
-TypeCode VectorElement(TypeView type) {
-  if (type.Op() == kOpVector) return TypeCode(type.Inner().Code());
-  TypeCode element;
-  AppendOp(element, type.Op() == kOpString8 ? kOpChar8 : kOpChar16);
-  return element;
-}
-
-const ClassDef* ModelOfType(TypeView type, NameSpace& root) {
-  if (type.Op() != kOpClass) return nullptr;
-  const auto* element = NamedElement(type, root);
-  if (!element || element->category != Category::Class) return nullptr;
-  const auto* def = static_cast<const ClassDef*>(element);
-  return def->IsPureModel() ? def : nullptr;
-}
-
 void AttributeWriter::WriteStruct(const std::string& className, TypeView type, const std::string& attributeName,
                                   const std::string& accessorName, const std::string& memberName, bool readOnly) {
   const std::string arguments = "(" + className + "," + attributeName + ")";
@@ -63,64 +44,51 @@ void AttributeWriter::WriteStruct(const std::string& className, TypeView type, c
                     .accessor = accessorName,
                     .member = memberName,
                     .readOnly = readOnly};
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     struct
     {
         $operators$
     } $member$;
   )",
-      "operators"_ = [&] { WriteOperators(scope, type); }, "member"_ = memberName);
+        "operators"_([&] { WriteOperators(scope, type); }), "member"_ = memberName);
 }
 
 void AttributeWriter::WriteOperators(Scope scope, TypeView type) {
   const Undecorated undecorated = WithoutDecorators(type, m_root);
   const TypeView inner = undecorated.type;
-  const TypeOp op = inner.Op();
   scope.readOnly = scope.readOnly || undecorated.Has(kHasConst);
   WriteConversions(scope, TypeText(m_access == Access::GetAndSet ? inner : type), undecorated.Has(kHasOffsettable));
 
   if (undecorated.Has(kHasAssignable) || m_access == Access::GetAndSet) return WritePlain(scope, type, inner);
-  if (undecorated.Has(kHasOffsettable)) return WriteOffset(scope, type, op);
-  if (const ClassDef* model = ModelOfType(inner, m_root)) return WriteModel(scope, *model);
-  if (IsVectorLike(inner)) {
-    const TypeCode element = VectorElement(inner);
-    return WriteVector(scope, element);
-  }
-  switch (op) {
-    case kOpArray:
-      return WriteProxy(scope, PathElement::Index(inner.Count()), "vesk::ssize_t", inner.Inner());
-    case kOpDynArray:
-      return WriteProxy(scope, PathElement::Index(-1), "vesk::ssize_t", inner.Inner());
-    case kOpMap:
-      return WriteProxy(scope, PathElement::Key(inner.Key()), TypeText(inner.Key()), inner.Value());
-    case kOpSet:
-      return WriteKeySet(scope, inner.Inner());
-    default:
+  if (undecorated.Has(kHasOffsettable)) return WriteOffset(scope, type, inner.Op());
+  const TypeShape shape = ShapeOf(inner, m_root);
+  switch (shape.shape) {
+    case Shape::Value:
       return WritePlain(scope, type, inner);
+    case Shape::Model:
+      return WriteModel(scope, *shape.model);
+    case Shape::Vector:
+      return WriteVector(scope, shape.element);
+    case Shape::Indexed:
+      return WriteProxy(scope, shape);
+    case Shape::KeySet:
+      return WriteKeySet(scope, shape.element);
   }
 }
 
 void AttributeWriter::WriteConversions(const Scope& scope, std::string_view type, bool isOffsettable) {
-  const std::string key = scope.Key();
-  Write(m_out, "operator $type$$reference$() const { return $self$->Get$field$($key$); }\n", "type"_ = type,
-        "reference"_ = ReturnsByValue() || isOffsettable ? "" : " const&", "self"_ = scope.constSelf,
-        "field"_ = scope.accessor, "key"_ = key);
+  const auto vars = WithVars(m_out, "type"_ = type, "self"_ = scope.self, "constSelf"_ = scope.constSelf,
+                             "field"_ = scope.accessor, "key"_ = scope.Key());
+  vars.Write("operator $type$$reference$() const { return $constSelf$->Get$field$($key$); }\n",
+             "reference"_ = ReturnsByValue() || isOffsettable ? "" : " const&");
   if (ReturnsByValue()) return;
-  auto write = [&] {
-    if (m_access != Access::Barriers) return;
-    Write(m_out, "$type$ & write() { return $self$->Write$field$($key$); }\n", "type"_ = type, "self"_ = scope.self,
-          "field"_ = scope.accessor, "key"_ = key);
-  };
-  Write(m_out, R"(
-    $type$ const& read() const { return $constSelf$->Get$field$($key$); }
-    $write$
+  vars.Write("$type$ const& read() const { return $constSelf$->Get$field$($key$); }\n");
+  if (m_access == Access::Barriers) vars.Write("$type$ & write() { return $self$->Write$field$($key$); }\n");
+  vars.Write(R"(
     $type$ const& model() const { return $constSelf$->_model__$field$($key$); }
     $type$& model() { return $self$->_model__$field$($key$); }
     vesk::Path path() const { return $constSelf$->Get$field$Path($key$); }
-  )",
-        "type"_ = type, "self"_ = scope.self, "constSelf"_ = scope.constSelf, "field"_ = scope.accessor, "key"_ = key,
-        "write"_ = write);
+  )");
 }
 
 void AttributeWriter::WriteModel(const Scope& scope, const ClassDef& model) {
@@ -237,9 +205,9 @@ void AttributeWriter::WriteKeySet(const Scope& scope, TypeView key) {
 
 // An element can't be a member of the union, so operator[] answers a small struct of the enclosing object and the
 // index.
-void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const std::string& keyType,
-                                 TypeView elementType) {
-  m_path.Push(std::move(element));
+void AttributeWriter::WriteProxy(const Scope& scope, const TypeShape& shape) {
+  m_path.Push(shape.Step());
+  const std::string keyType = shape.KeyText();
   const std::string proxy = scope.accessor + "Element";
   const std::string index = ParameterName(scope.depth);
   const Scope elementScope{.className = proxy,
@@ -251,8 +219,8 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
                            .inProxy = true,
                            .readOnly = scope.readOnly};
   auto writeForwarders = [&] {
-    if (!NeedsForwarders(WithoutDecorators(elementType, m_root).type.Op())) return;
-    WriteForwarders(scope.depth, scope.depth, elementType, proxy, scope.readOnly);
+    if (!NeedsForwarders(WithoutDecorators(shape.element, m_root).type.Op())) return;
+    WriteForwarders(scope.depth, scope.depth, shape.element, proxy, scope.readOnly);
   };
   auto writeWritableIndexing = [&] {
     if (scope.readOnly) return;
@@ -264,8 +232,7 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
     )",
           "proxy"_ = proxy, "key"_ = keyType, "index"_ = index, "self"_ = scope.inProxy ? "this" : scope.self);
   };
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     struct $proxy$
     {
         $proxy$($object$* _self, $key$ _k) : _self(_self),$index$(_k) {}
@@ -280,9 +247,9 @@ void AttributeWriter::WriteProxy(const Scope& scope, PathElement element, const 
         return $proxy$(const_cast<$object$*>($self$),$index$);
     }
   )",
-      "proxy"_ = proxy, "object"_ = scope.className, "key"_ = keyType, "index"_ = index,
-      "forwarders"_ = writeForwarders, "operators"_ = [&] { WriteOperators(elementScope, elementType); },
-      "writableIndexing"_ = writeWritableIndexing, "self"_ = scope.inProxy ? "this" : scope.constSelf);
+        "proxy"_ = proxy, "object"_ = scope.className, "key"_ = keyType, "index"_ = index,
+        "forwarders"_ = writeForwarders, "operators"_([&] { WriteOperators(elementScope, shape.element); }),
+        "writableIndexing"_ = writeWritableIndexing, "self"_ = scope.inProxy ? "this" : scope.constSelf);
   m_path.Pop();
 }
 
@@ -292,97 +259,103 @@ bool AttributeWriter::IsForwardedAsWhole(const Undecorated& type) const {
   const TypeOp op = type.type.Op();
   if (type.Has(kHasAssignable) || IsForwardedScalar(op)) return true;
   if (!m_forwardsAll || op == kOpSet || (op != kOpClass && NeedsForwarders(op))) return false;
-  return !ModelOfType(type.type, m_root);
+  return ShapeOf(type.type, m_root).shape != Shape::Model;
 }
 
 void AttributeWriter::WriteForwarders(size_t first, size_t last, TypeView type, const std::string& name,
                                       bool readOnly) {
   const Undecorated undecorated = WithoutDecorators(type, m_root);
   const TypeView inner = undecorated.type;
-  const TypeOp op = inner.Op();
   const std::string parameters = ForwardedParameters(first, last);
   const std::string arguments = FieldPath::Arguments(first, last + 1);
-  Write(m_out, R"(
+  const auto vars =
+      WithVars(m_out, "name"_ = name, "type"_ = TypeText(type), "parameters"_ = parameters, "arguments"_ = arguments,
+               "parametersAnd"_ = WithComma(parameters), "argumentsAnd"_ = WithComma(arguments));
+  vars.Write(R"(
     vesk::Path Get$name$Path($parameters$) const { return _self->Get$name$Path($arguments$); }
     $type$ const& _model__$name$($parameters$) const { return _self->_model__$name$($arguments$); }
     $type$& _model__$name$($parameters$) { return _self->_model__$name$($arguments$); }
     $type$ const& Get$name$($parameters$) const { return _self->Get$name$($arguments$); }
-  )",
-        "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments, "type"_ = TypeText(type));
-
+  )");
   if (m_forwardsAll && m_access == Access::Barriers) {
-    Write(m_out, "$type$& Write$name$($parameters$) { return _self->Write$name$($arguments$); }\n", "type"_ = type,
-          "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments);
+    vars.Write("$type$& Write$name$($parameters$) { return _self->Write$name$($arguments$); }\n");
   }
   if (IsForwardedAsWhole(undecorated)) {
     if (readOnly) return;
-    Write(m_out, "void $verb$$name$($parameters$$value$) { _self->$verb$$name$($arguments$_v); }\n",
-          "verb"_ = undecorated.Has(kHasOffsettable) ? "Offset" : "Set", "name"_ = name,
-          "parameters"_ = WithComma(parameters), "value"_ = ConstReferenceText(type, "_v"),
-          "arguments"_ = WithComma(arguments));
-  } else if (IsVectorLike(inner)) {
-    if (readOnly) return;
-    Write(m_out, R"(
-      void CreateInto$name$($parameters$vesk::ssize_t _i,$element$ const* _src,vesk::ssize_t _n)
-      {
-          _self->CreateInto$name$($arguments$_i,_src,_n);
-      }
-      void DeleteFrom$name$($parameters$vesk::ssize_t _i1,vesk::ssize_t _i2)
-      {
-          _self->DeleteFrom$name$($arguments$_i1,_i2);
-      }
-    )",
-          "name"_ = name, "parameters"_ = WithComma(parameters), "element"_ = TypeText(VectorElement(inner)),
-          "arguments"_ = WithComma(arguments));
-  } else if (op == kOpClass) {
-    const NameSpaceElement* element = NamedElement(inner, m_root);
-    if (!element || element->category != Category::Class) return;
-    for (const ModelField* field : static_cast<const ClassDef*>(element)->m_modelFields) {
-      if (!field->IsDropped()) WriteForwarders(first, last, field->m_type, name + field->m_name, readOnly);
-    }
-  } else if (op == kOpArray) {
-    WriteContainerForwarders(first, last, PathElement::Index(inner.Count()), inner.Inner(), name, readOnly);
-  } else if (op == kOpDynArray) {
-    WriteContainerForwarders(first, last, PathElement::Index(-1), inner.Inner(), name, readOnly);
-  } else if (op == kOpMap) {
-    WriteContainerForwarders(first, last, PathElement::Key(inner.Key()), inner.Value(), name, readOnly);
-  } else if (op == kOpSet) {
-    if (readOnly) return;
-    for (std::string_view verb : {"InsertInto", "DeleteFrom"}) {
-      Write(m_out, R"(
-        bool $verb$$name$($parameters$$key$ const& _key)
+    return vars.Write("void $verb$$name$($parametersAnd$$value$) { _self->$verb$$name$($argumentsAnd$_v); }\n",
+                      "verb"_ = undecorated.Has(kHasOffsettable) ? "Offset" : "Set",
+                      "value"_ = ConstReferenceText(type, "_v"));
+  }
+  const TypeShape shape = ShapeOf(inner, m_root);
+  switch (shape.shape) {
+    case Shape::Value:
+    case Shape::Model:
+      return WriteFieldForwarders(first, last, inner, name, readOnly);
+    case Shape::Indexed:
+      return WriteElementForwarders(first, last, shape, name, readOnly);
+    case Shape::Vector:
+      if (readOnly) return;
+      return vars.Write(R"(
+        void CreateInto$name$($parametersAnd$vesk::ssize_t _i,$element$ const* _src,vesk::ssize_t _n)
         {
-            return _self->$verb$$name$($arguments$_key);
+            _self->CreateInto$name$($argumentsAnd$_i,_src,_n);
+        }
+        void DeleteFrom$name$($parametersAnd$vesk::ssize_t _i1,vesk::ssize_t _i2)
+        {
+            _self->DeleteFrom$name$($argumentsAnd$_i1,_i2);
         }
       )",
-            "verb"_ = verb, "name"_ = name, "parameters"_ = WithComma(parameters), "key"_ = inner.Inner(),
-            "arguments"_ = WithComma(arguments));
-    }
-  } else {
-    TraceWriter() << "*bc = " << static_cast<uint8_t>(op) << "\n";
+                        "element"_ = shape.element);
+    case Shape::KeySet:
+      if (readOnly) return;
+      return vars.Write(R"(
+        bool InsertInto$name$($parametersAnd$$key$ const& _key)
+        {
+            return _self->InsertInto$name$($argumentsAnd$_key);
+        }
+        bool DeleteFrom$name$($parametersAnd$$key$ const& _key)
+        {
+            return _self->DeleteFrom$name$($argumentsAnd$_key);
+        }
+      )",
+                        "key"_ = shape.element);
   }
 }
 
-void AttributeWriter::WriteContainerForwarders(size_t first, size_t last, PathElement element, TypeView elementType,
-                                               const std::string& name, bool readOnly) {
+// Of a class of any kind; other types have none.
+void AttributeWriter::WriteFieldForwarders(size_t first, size_t last, TypeView type, const std::string& name,
+                                           bool readOnly) {
+  if (type.Op() != kOpClass) {
+    TraceWriter() << "*bc = " << static_cast<uint8_t>(type.Op()) << "\n";
+    return;
+  }
+  const NameSpaceElement* element = NamedElement(type, m_root);
+  if (!element || element->category != Category::Class) return;
+  for (const ModelField* field : static_cast<const ClassDef*>(element)->m_modelFields) {
+    if (!field->IsDropped()) WriteForwarders(first, last, field->m_type, name + field->m_name, readOnly);
+  }
+}
+
+void AttributeWriter::WriteElementForwarders(size_t first, size_t last, const TypeShape& shape, const std::string& name,
+                                             bool readOnly) {
   const std::string parameters = ForwardedParameters(first, last);
   const std::string arguments = FieldPath::Arguments(first, last + 1);
   Write(m_out, "vesk::ssize_t Get$name$Size($parameters$) const { return _self->Get$name$Size($arguments$); }\n",
         "name"_ = name, "parameters"_ = parameters, "arguments"_ = arguments);
-  m_path.Push(std::move(element));
-  if (elementType.WithoutMetadata().IsBuiltIn() && !m_forwardsAll) {
+  m_path.Push(shape.Step());
+  if (shape.element.WithoutMetadata().IsBuiltIn() && !m_forwardsAll) {
     const std::string elementParameters = ForwardedParameters(first, last + 1);
     const std::string elementArguments = FieldPath::Arguments(first, last + 2);
     Write(m_out,
           "$type$ const& Get$name$Element($parameters$) const { return _self->Get$name$Element($arguments$); }\n",
-          "type"_ = elementType, "name"_ = name, "parameters"_ = elementParameters, "arguments"_ = elementArguments);
+          "type"_ = shape.element, "name"_ = name, "parameters"_ = elementParameters, "arguments"_ = elementArguments);
     if (!readOnly) {
       Write(m_out, "void Set$name$Element($parameters$$type$ _e) { _self->Set$name$Element($arguments$_e); }\n",
-            "name"_ = name, "parameters"_ = WithComma(elementParameters), "type"_ = elementType,
+            "name"_ = name, "parameters"_ = WithComma(elementParameters), "type"_ = shape.element,
             "arguments"_ = WithComma(elementArguments));
     }
   } else {
-    WriteForwarders(first, last + 1, elementType, name + "Element", readOnly);
+    WriteForwarders(first, last + 1, shape.element, name + "Element", readOnly);
   }
   m_path.Pop();
 }

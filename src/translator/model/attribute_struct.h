@@ -9,13 +9,9 @@
 #include "text/text_writer.h"
 #include "translator/declared/class_def.h"
 #include "translator/model/field_path.h"
+#include "translator/model/type_shape.h"
 
 namespace qrex {
-
-// --- What accessors and attribute structs ask of a type; `type` has no metadata, typedef or decorator at its head.
-bool IsVectorLike(TypeView type);
-TypeCode VectorElement(TypeView type);                        // of a vector or a string
-const ClassDef* ModelOfType(TypeView type, NameSpace& root);  // a class of kind model; or null
 
 // What generated code goes through to get at a field or an attribute.
 enum class Access {
@@ -56,12 +52,13 @@ class AttributeWriter {
   void WritePlain(const Scope& scope, TypeView type, TypeView inner);
   void WriteVector(const Scope& scope, TypeView element);
   void WriteKeySet(const Scope& scope, TypeView key);
-  void WriteProxy(const Scope& scope, PathElement element, const std::string& keyType, TypeView elementType);
+  void WriteProxy(const Scope& scope, const TypeShape& shape);
 
   bool IsForwardedAsWhole(const Undecorated& type) const;
   void WriteForwarders(size_t first, size_t last, TypeView type, const std::string& name, bool readOnly);
-  void WriteContainerForwarders(size_t first, size_t last, PathElement element, TypeView elementType,
-                                const std::string& name, bool readOnly);
+  void WriteFieldForwarders(size_t first, size_t last, TypeView type, const std::string& name, bool readOnly);
+  void WriteElementForwarders(size_t first, size_t last, const TypeShape& shape, const std::string& name,
+                              bool readOnly);
   std::string ForwardedParameters(size_t first, size_t last) const { return m_path.Parameters(first + 1, last + 1); }
 
   TextWriter& m_out;

@@ -82,8 +82,7 @@ void WriteReturnEqual(TextWriter& out, const std::vector<const ModelField*>& fie
 void WriteComparisons(TextWriter& out, const ClassDef& def) {
   const auto fields = NonDropped(def);
   const std::string name = def.ModelStructName();
-  Write(
-      out, R"(
+  Write(out, R"(
     bool operator<($name$ const& _rhs) const
     {
         $returnLess$
@@ -94,9 +93,9 @@ void WriteComparisons(TextWriter& out, const ClassDef& def) {
     }
     $derivedComparisons$
   )",
-      "name"_ = name, "returnLess"_ = [&] { WriteReturnLess(out, fields); },
-      "returnEqual"_ = [&] { WriteReturnEqual(out, fields); },
-      "derivedComparisons"_ = [&] { WriteDerivedComparisons(out, name); });
+        "name"_ = name, "returnLess"_([&] { WriteReturnLess(out, fields); }),
+        "returnEqual"_([&] { WriteReturnEqual(out, fields); }),
+        "derivedComparisons"_([&] { WriteDerivedComparisons(out, name); }));
 }
 
 void WriteFieldDeclarations(TextWriter& out, const ClassDef& def) {
@@ -202,9 +201,8 @@ void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& 
           "initialiser"_ = If(isIndeterminate && def.WantsCompilableText(), "{}"));
   }
   if (field.m_rsnAdded != def.m_firstRsn) {
-    Write(
-        out, "if (_rsn <= $lastWithout$) { $evolve$ }\nelse ", "lastWithout"_ = field.m_rsnAdded - 1,
-        "evolve"_ = [&] { WriteEvolveCall(out, def, field); });
+    Write(out, "if (_rsn <= $lastWithout$) { $evolve$ }\nelse ", "lastWithout"_ = field.m_rsnAdded - 1,
+          "evolve"_([&] { WriteEvolveCall(out, def, field); }));
   }
   if (field.IsDropped()) {
     Write(out, "if (_rsn < $dropped$) _ar >> $name$;\n", "dropped"_ = field.m_rsnDropped, "name"_ = field.m_name);
@@ -215,15 +213,14 @@ void WriteVersionedRead(TextWriter& out, const ClassDef& def, const ModelField& 
 
 void WriteReads(TextWriter& out, const ClassDef& def) {
   if (def.m_numModelSchema >= 2) {
-    Write(
-        out, R"(
+    Write(out, R"(
       vesk::RSN _rsn = vesk::$target$_GetModelRsn();
       struct EvolveCode
       {
           $functions$
       };
     )",
-        "target"_ = TargetIdentifier(def), "functions"_ = [&] { WriteEvolveFunctions(out, def); });
+          "target"_ = TargetIdentifier(def), "functions"_([&] { WriteEvolveFunctions(out, def); }));
     for (const ModelField* field : def.m_modelFields) WriteVersionedRead(out, def, *field);
   } else if (!def.m_modelFields.empty()) {
     auto writeField = [&](const ModelField* field) { out << ">> this->" << field->m_name; };
@@ -237,16 +234,15 @@ void WriteDeserialise(TextWriter& out, const ClassDef& def, Placement placement)
   if (!def.CanSerialiseEmbeddedModel()) return;
   const bool inClass = placement == Placement::InClass;
   const bool isTemplate = inClass && def.WantsCompilableText();  // the archive functions of the fields may come later
-  Write(
-      out, R"(
+  Write(out, R"(
     $template$void $scope$Deserialise($archive$& _ar)
     {
         $reads$
     }
   )",
-      "template"_ = If(isTemplate, "template<typename Archive> "),
-      "scope"_ = inClass ? "" : ModelScope(def) + "::", "archive"_ = isTemplate ? "Archive" : "vesk::InputArchive",
-      "reads"_ = [&] { WriteReads(out, def); });
+        "template"_ = If(isTemplate, "template<typename Archive> "),
+        "scope"_ = inClass ? "" : ModelScope(def) + "::", "archive"_ = isTemplate ? "Archive" : "vesk::InputArchive",
+        "reads"_([&] { WriteReads(out, def); }));
 }
 
 // --- Visiting
@@ -312,14 +308,13 @@ void WriteReadAndWrite(TextWriter& out, const ClassDef& def, const ClassDef& mod
 
 void WriteAttributeStructs(TextWriter& out, const ClassDef& def, const ClassDef& model, Access access) {
   if (model.GetNumNonDroppedModelFields() == 0) return;
-  Write(
-      out, R"(
+  Write(out, R"(
     union
     {
         $structs$
     };
   )",
-      "structs"_ = [&] { WriteModelMixinAttributeStructs(out, def, model, access); });
+        "structs"_([&] { WriteModelMixinAttributeStructs(out, def, model, access); }));
 }
 
 }  // namespace
@@ -328,10 +323,9 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
   const ClassDef& model = def.m_referencedModel ? *def.m_referencedModel : def;
   const std::string mixin = def.name + "_model_mixin";
   const std::string type = model.QualifiedModelStructName() + model.TemplateArgs();
-  const bool operations = def.GenerateOps() && model.qualifiers.genop != TriState::Off;
+  const bool operations = def.GenerateOps() && model.m_qualifiers.genop != TriState::Off;
   const Access access = operations ? Access::Operations : Access::Barriers;
-  Write(
-      out, R"(
+  Write(out, R"(
     template <typename BC$templateParameters$>
     struct $mixin$ : public BC
     {
@@ -352,13 +346,13 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def) {
         $type$ _model_;
     };
   )",
-      "templateParameters"_ = def.IsTemplate() ? "," + def.m_templateArgList : "", "mixin"_ = mixin, "type"_ = type,
-      "derivedComparisons"_ = [&] { WriteDerivedComparisons(out, mixin); },
-      "evict"_ = def.GenerateOps() ? "vesk::EvictIndepFieldsUnderObject(" + std::string(kConstFinal) + ")"
-                                   : "_model_.EvictDgsNodes()",
-      "accessors"_ = [&] { WriteModelMixinAccessors(out, def, model, access); },
-      "attributeStructs"_ = [&] { WriteAttributeStructs(out, def, model, access); },
-      "readAndWrite"_ = [&] { WriteReadAndWrite(out, def, model, type, access); });
+        "templateParameters"_ = def.IsTemplate() ? "," + def.m_templateArgList : "", "mixin"_ = mixin, "type"_ = type,
+        "derivedComparisons"_([&] { WriteDerivedComparisons(out, mixin); }),
+        "evict"_ = def.GenerateOps() ? "vesk::EvictIndepFieldsUnderObject(" + std::string(kConstFinal) + ")"
+                                     : "_model_.EvictDgsNodes()",
+        "accessors"_([&] { WriteModelMixinAccessors(out, def, model, access); }),
+        "attributeStructs"_([&] { WriteAttributeStructs(out, def, model, access); }),
+        "readAndWrite"_([&] { WriteReadAndWrite(out, def, model, type, access); }));
 }
 
 // --- Around the class
@@ -460,17 +454,16 @@ void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
     return;
   }
   if (!def.IsPureModel() && !def.m_inheritsModel) return;
-  const auto writeFields = def.qualifiers.multiline == TriState::On ? WriteInsertionLines : WriteInsertionList;
-  Write(
-      out, R"(
+  const auto writeFields = def.m_qualifiers.multiline == TriState::On ? WriteInsertionLines : WriteInsertionList;
+  Write(out, R"(
     $prefix$inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x)
     {
         $fields$
         return _os;
     }
   )",
-      "prefix"_ = prefix, "name"_ = name,
-      "fields"_ = [&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); });
+        "prefix"_ = prefix, "name"_ = name,
+        "fields"_([&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); }));
 }
 
 }  // namespace qrex

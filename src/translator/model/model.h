@@ -27,12 +27,12 @@ void WriteModelMixin(TextWriter& out, const ClassDef& def);
 // At class level, in the reflection tail: what must be declared ahead of the class's definitions, and the two functions
 // that keep the data source's release number.
 void WriteModelRsnDeclarations(TextWriter& out, const ClassDef& def);
-// All that those of a class may call, where they stand in the class itself.
+// All that those of a class may call, where they are in the class itself.
 void WriteTargetDeclarations(TextWriter& out, const ClassDef& def);
 void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def, Placement placement);
 
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def);  // when `os` is unset
-// Behind metadata, decorators and fixed arrays, does a map or a set stand? That type, or none.
+// Behind metadata, decorators and fixed arrays, is there a map or a set? That type, or none.
 TypeView MapOrSetIn(TypeView type);
 inline bool HoldsMapOrSet(TypeView type) { return !MapOrSetIn(type).Empty(); }
 // The rows of `_modelFields`; returns their number.

@@ -3,6 +3,7 @@
 #include "translator/emit/emit.h"
 #include "translator/model/attribute_struct.h"
 #include "translator/model/field_path.h"
+#include "translator/model/type_shape.h"
 #include "translator/symbols/scanned_file.h"
 
 namespace qrex {
@@ -40,7 +41,7 @@ class AccessorWriter {
   void WriteKeySet(TypeView key, const std::string& name, const std::string& expression);
 
   std::string PathCall(const std::string& name) const { return "Get" + name + "Path(" + m_path.Arguments() + ")"; }
-  // Statements, each with what must stand ahead of it.
+  // Statements, each with what must be ahead of it.
   void WriteReadBarrier(const std::string& name, const std::string& expression);
   void WriteWriteBarrier(const std::string& expression);
   void WriteOperation(std::string_view function, const std::string& name, const std::string& expression,
@@ -87,14 +88,13 @@ void AccessorWriter::WriteOperation(std::string_view function, const std::string
 
 void AccessorWriter::WritePathFunctions(const std::string& name) {
   const std::string parameters = m_path.Parameters();
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     static void Get$name$Path(vesk::Path& _path$further$) { $body$}
     static vesk::Path Get$name$Path($parameters$) { vesk::Path _path; Get$name$Path($pathAndArguments$); return _path; }
   )",
-      "name"_ = name, "further"_ = parameters.empty() ? "" : "," + parameters,
-      "body"_ = [&] { m_path.WriteBody(m_out); }, "parameters"_ = parameters,
-      "pathAndArguments"_ = parameters.empty() ? "_path" : "_path," + m_path.Arguments());
+        "name"_ = name, "further"_ = parameters.empty() ? "" : "," + parameters,
+        "body"_([&] { m_path.WriteBody(m_out); }), "parameters"_ = parameters,
+        "pathAndArguments"_ = parameters.empty() ? "_path" : "_path," + m_path.Arguments());
 }
 
 void AccessorWriter::WriteField(PathElement element, TypeView type, const std::string& name,
@@ -102,14 +102,13 @@ void AccessorWriter::WriteField(PathElement element, TypeView type, const std::s
   m_path.Push(std::move(element));
   m_out << "\n";
   WritePathFunctions(name);
-  Write(
-      m_out, R"(
+  Write(m_out, R"(
     $type$ const& _model__$name$($parameters$) const { return $expression$; }
     $type$& _model__$name$($parameters$) { return $expression$; }
     $type$ const& Get$name$($parameters$) const { $barrier$return $expression$; }
   )",
-      "type"_ = TypeText(type), "name"_ = name, "parameters"_ = m_path.Parameters(), "expression"_ = expression,
-      "barrier"_ = [&] { WriteReadBarrier(name, expression); });
+        "type"_ = TypeText(type), "name"_ = name, "parameters"_ = m_path.Parameters(), "expression"_ = expression,
+        "barrier"_([&] { WriteReadBarrier(name, expression); }));
   if (m_allAreWritten) WriteWriting(type, name, expression);
   WriteByType(type, name, expression);
   m_path.Pop();
@@ -117,36 +116,26 @@ void AccessorWriter::WriteField(PathElement element, TypeView type, const std::s
 
 void AccessorWriter::WriteByType(TypeView type, const std::string& name, const std::string& expression) {
   const Undecorated undecorated = WithoutDecorators(type, m_root);
-  const TypeView inner = undecorated.type;
-  auto writeElement = [&](PathElement element, TypeView elementType) {
-    const std::string index = ParameterName(m_path.ParameterCount());
-    WriteField(std::move(element), elementType, name + "Element", expression + "[" + index + "]");
-  };
   if (undecorated.Has(kHasAssignable)) return WriteSet(type, name, expression);
   if (undecorated.Has(kHasOffsettable)) return WriteOffset(type, name, expression);
-  if (const ClassDef* model = ModelOfType(inner, m_root)) {
-    for (size_t i = 0; i < model->m_modelFields.size(); ++i) {
-      const ModelField& field = *model->m_modelFields[i];
-      if (field.IsDropped()) continue;
-      WriteField(PathElement::Constant(i), field.m_type, name + field.m_name, expression + "." + field.m_name);
-    }
-    return;
-  }
-  if (IsVectorLike(inner)) {
-    const TypeCode element = VectorElement(inner);
-    return WriteVector(element, name, expression);
-  }
-  switch (inner.Op()) {
-    case kOpArray:
-      return writeElement(PathElement::Index(inner.Count()), inner.Inner());
-    case kOpDynArray:
-      return writeElement(PathElement::Index(-1), inner.Inner());
-    case kOpMap:
-      return writeElement(PathElement::Key(inner.Key()), inner.Value());
-    case kOpSet:
-      return WriteKeySet(inner.Inner(), name, expression);
-    default:
+  const TypeShape shape = ShapeOf(undecorated.type, m_root);
+  switch (shape.shape) {
+    case Shape::Value:
       return WriteSet(type, name, expression);
+    case Shape::Model:
+      for (size_t i = 0; i < shape.model->m_modelFields.size(); ++i) {
+        const ModelField& field = *shape.model->m_modelFields[i];
+        if (field.IsDropped()) continue;
+        WriteField(PathElement::Constant(i), field.m_type, name + field.m_name, expression + "." + field.m_name);
+      }
+      return;
+    case Shape::Vector:
+      return WriteVector(shape.element, name, expression);
+    case Shape::Indexed:
+      return WriteField(shape.Step(), shape.element, name + "Element",
+                        expression + "[" + ParameterName(m_path.ParameterCount()) + "]");
+    case Shape::KeySet:
+      return WriteKeySet(shape.element, name, expression);
   }
 }
 
@@ -163,19 +152,17 @@ std::string AccessorWriter::VectorOperation(std::string_view verb, TypeView elem
 
 void AccessorWriter::WriteWriting(TypeView type, const std::string& name, const std::string& expression) {
   if (m_access == Access::Operations) return;
-  Write(
-      m_out, "$type$& Write$name$($parameters$) { $barrier$ return $expression$; }\n", "type"_ = type, "name"_ = name,
-      "parameters"_ = m_path.Parameters(), "barrier"_ = [&] { WriteWriteBarrier(expression); },
-      "expression"_ = expression);
+  Write(m_out, "$type$& Write$name$($parameters$) { $barrier$ return $expression$; }\n", "type"_ = type, "name"_ = name,
+        "parameters"_ = m_path.Parameters(), "barrier"_([&] { WriteWriteBarrier(expression); }),
+        "expression"_ = expression);
 }
 
 void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std::string& expression) {
   if (!m_allAreWritten) WriteWriting(type, name, expression);
   auto writeAssignment = [&] {
     if (m_access == Access::Operations) return WriteOperation(AssignOperation(type), name, expression, "_v");
-    Write(
-        m_out, "$barrier$$expression$ = _v;", "barrier"_ = [&] { WriteWriteBarrier(expression); },
-        "expression"_ = expression);
+    Write(m_out, "$barrier$$expression$ = _v;", "barrier"_([&] { WriteWriteBarrier(expression); }),
+          "expression"_ = expression);
   };
   Write(m_out, "void Set$name$($parameters$$value$) { $assignment$ }\n", "name"_ = name,
         "parameters"_ = WithComma(m_path.Parameters()), "value"_ = ConstReferenceText(type, "_v"),
@@ -185,9 +172,8 @@ void AccessorWriter::WriteSet(TypeView type, const std::string& name, const std:
 void AccessorWriter::WriteOffset(TypeView type, const std::string& name, const std::string& expression) {
   auto writeAddition = [&] {
     if (m_access == Access::Operations) return WriteOperation("genop_OffsetValue", name, expression, "_v");
-    Write(
-        m_out, "$barrier$$expression$ += _v;", "barrier"_ = [&] { WriteWriteBarrier(expression); },
-        "expression"_ = expression);
+    Write(m_out, "$barrier$$expression$ += _v;", "barrier"_([&] { WriteWriteBarrier(expression); }),
+          "expression"_ = expression);
   };
   Write(m_out, "void Offset$name$($parameters$$value$) { $addition$ }\n", "name"_ = name,
         "parameters"_ = WithComma(m_path.Parameters()), "value"_ = ConstReferenceText(type, "_v"),
@@ -247,9 +233,9 @@ void AccessorWriter::WriteKeySet(TypeView key, const std::string& name, const st
         m_out << "return ";
         return WriteOperation(operation, element, expression, index);
       }
-      Write(
-          m_out, "$barrier$return $expression$.$member$($index$);", "barrier"_ = [&] { WriteWriteBarrier(expression); },
-          "expression"_ = expression, "member"_ = member, "index"_ = index);
+      Write(m_out, "$barrier$return $expression$.$member$($index$);",
+            "barrier"_([&] { WriteWriteBarrier(expression); }), "expression"_ = expression, "member"_ = member,
+            "index"_ = index);
     };
     Write(m_out, "bool $verb$$name$($parameters$) { $return$ }\n", "verb"_ = verb, "name"_ = name,
           "parameters"_ = m_path.Parameters(), "return"_ = writeReturn);

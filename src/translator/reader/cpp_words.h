@@ -5,7 +5,7 @@
 
 namespace qrex {
 
-// Adds a line to an error that stands in `text` at a word that C++ would take there.
+// Adds a line to an error in `text` at a word that C++ would take there.
 void AdviseOnCppWord(const TextRange& text, LexScannerException& exception);
 
 }  // namespace qrex

@@ -1,5 +1,5 @@
 // The word `namespace`. In C++ of today only a definition is acted on: an alias, a macro's argument or the text of a #
-// line is plain text. Else the word opens a name space of one name or none, wherever it stands.
+// line is plain text. Else the word opens a name space of one name or none, wherever it is.
 #include <algorithm>
 
 #include "translator/reader/qrex_parser.h"
@@ -37,7 +37,7 @@ bool QrexParser::StandsInDirective(const char* position) {
 // no text is read for more than one of them.
 std::optional<QrexParser::NameSpaceHead> QrexParser::ReadNameSpaceHead() {
   NameSpaceHead head;
-  std::vector<LexToken> words, calls;  // of one level: those that stand alone, those with arguments
+  std::vector<LexToken> words, calls;  // of one level: those without arguments, those with
   const auto endLevel = [&] {
     if (!words.empty()) {
       head.names.push_back(NameAmong(words));

@@ -52,20 +52,20 @@ class QrexParserOutputStream : public IOutputStream {
   const char* m_copied = nullptr;
 };
 
-enum class Naming { None, Optional, Required };  // may, or must, a name stand behind the type
+enum class Naming { None, Optional, Required };  // may, or must, a name follow the type
 
 struct ParsedType {
   TypeCode type;
   std::string name;               // empty: there is none
-  bool followedByParen = false;   // behind the name stands a `(`
-  const char* nameEnd = nullptr;  // in the expanded text: behind the name, or where it could stand
-  size_t suffixSize = 0;          // of the part of `type` that stands for the arrays behind the name
+  bool followedByParen = false;   // a `(` follows the name
+  const char* nameEnd = nullptr;  // in the expanded text: behind the name, or where it could be
+  size_t suffixSize = 0;          // of the part of `type` that is the arrays behind the name
 };
 
 struct SignatureRules {
   bool constAllowed = false;  // behind the arguments
   bool directions = false;    // each argument begins with [in], [out], ...; a method returns nothing
-  bool polymorphic = false;   // an argument may stand in [ ]
+  bool polymorphic = false;   // an argument may be in [ ]
   bool reflected = false;     // all types must be understood completely
 };
 
@@ -153,7 +153,7 @@ class QrexParser : public ExpressionParser {
   const char* SourcePosition() {
     out.Flush();
     return stream.SourcePosition();
-  }  // where the next declaration stands
+  }  // where the next declaration begins
   NameSpace& Current() { return *m_nameSpaces.back(); }
   NameSpace& Root() { return *m_nameSpaces.front(); }
   bool AtFileScope() const { return m_nameSpaces.size() == 1; }
@@ -201,12 +201,12 @@ class QrexParser : public ExpressionParser {
   std::vector<NameSpace*> m_nameSpaces;  // the root first, the current one last
   struct OuterDepth {
     int64_t braces;
-    size_t nameSpaces;  // how many stand open there
+    size_t nameSpaces;  // how many are open there
   };
   std::vector<OuterDepth> m_savedDepths;  // of the definitions of name spaces that are open
   int64_t m_braceDepth = 0;
   const char* m_lineAsked;         // see StandsInDirective
-  bool m_lineIsDirective = false;  // of the line on which that stands
+  bool m_lineIsDirective = false;  // of the line on which that is
 };
 
 // Bounds the recursion of handlers that call each other for nested declarations, types or lists.

@@ -37,7 +37,7 @@ bool ParseQualifierList(QrexParser& parser, ClassDef& def) {
     const bool on = !parser.Accept(kMinus);
     if (const QualifierWord* word = FindQualifierWord(parser.current.text.View())) {
       if (!on && word->word == "dc" && def.IsPureModel()) parser.Fail("Qualifier <<-dc>> invalid for a $model");
-      def.qualifiers.*word->state = on ? TriState::On : TriState::Off;
+      def.m_qualifiers.*word->state = on ? TriState::On : TriState::Off;
       redundant = redundant || word->needsReflection;
     } else if (parser.Is("nested")) {
       def.m_nested = true;

@@ -14,7 +14,7 @@ namespace {
 
 struct TemplateName {
   std::string_view word;
-  std::array<TypeOp, 3> ops;  // what it stands for, outermost first; kOpVoid ends
+  std::array<TypeOp, 3> ops;  // what it means, outermost first; kOpVoid ends
   bool IsDeprecated() const { return ops[1] != kOpVoid; }
 };
 constexpr TemplateName kTemplateNames[] = {

@@ -162,7 +162,7 @@ std::string MangledType(TypeView type) {
 
 namespace {
 
-// The name under which a destructor stands, without the `~`.
+// The name of a destructor, without the `~`.
 std::string_view DestructorStem(TypeView type) {
   const TypeOp op = type.Op();
   if (op == kOpArray) return "Array";

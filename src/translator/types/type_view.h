@@ -10,7 +10,7 @@
 
 namespace qrex {
 
-// Views a code, or the part of one that stands for a type within a type. The code must outlive the view.
+// Views a code, or the part of one that is a type within a type. The code must outlive the view.
 class TypeView {
  public:
   TypeView() = default;  // no type; Op() answers kOpVoid
@@ -20,7 +20,7 @@ class TypeView {
   bool Empty() const { return m_code.empty(); }
   std::string_view Code() const { return m_code; }
 
-  // What stands at the head: metadata, a decorator, a container, or a plain type.
+  // What is at the head: metadata, a decorator, a container, or a plain type.
   TypeOp Op() const { return m_code.empty() ? kOpVoid : static_cast<TypeOp>(static_cast<uint8_t>(m_code.front())); }
   bool IsMetadata() const { return Op() >= kOpMetaBool; }
   bool IsBuiltIn() const { return Op() <= kOpString16; }
@@ -40,7 +40,7 @@ class TypeView {
   TypeView WithoutMetadata() const;  // the head's metadata skipped
 
  private:
-  std::string_view Behind() const;  // what stands in the code behind the type at the head
+  std::string_view Behind() const;  // what is in the code behind the type at the head
 
   std::string_view m_code;
 };

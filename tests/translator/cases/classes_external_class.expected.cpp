@@ -2,22 +2,11 @@
 
 //### $struct+ A
 namespace vesk { XTarget* app_GetXTarget(); }
-    vesk::ReflectedClass const& _GetReflected(A const*)
-    {
-        static const vesk::octet_t A_x[] =
-        {
-            0x04
-        };
-        static const vesk::ReflectedField A_fields[] =
-        {
-            { "x", offsetof(A,x), A_x },
-        };
-        static const vesk::ReflectedClassMethod A_methods[] =
-        {
-            {"f",{0},0,0,0,false,(vesk::FunctionPointer)(void (__stdcall *)(A* _self))&::f},
-        };
-        static const vesk::ReflectedClass A_class =
-        {
+    vesk::ReflectedClass const& _GetReflected(A const*) {
+        static const vesk::octet_t A_x[] = { 0x04 };
+        static const vesk::ReflectedField A_fields[] = { { "x", offsetof(A,x), A_x }, };
+        static const vesk::ReflectedClassMethod A_methods[] = { {"f",{0},0,0,0,false,(vesk::FunctionPointer)(void (__stdcall *)(A* _self))&::f}, };
+        static const vesk::ReflectedClass A_class = {
             0,
             "A",
             sizeof(A),
@@ -30,33 +19,16 @@ namespace vesk { XTarget* app_GetXTarget(); }
             0,0,0,
             0,
             0,
-            {
-                sizeof(A),
-                0,
-                0,
-                0,
-                (vesk::ConstructArrayFn) (void (*)( A*, vesk::ssize_t, vesk::ssize_t)) vesk::ConstructArray<A>,
-                (vesk::CopyConstructArrayFn) (void (*)(A*, vesk::ssize_t, A const*, vesk::ssize_t, vesk::ssize_t)) vesk::CopyConstructArray<A>,
-                (vesk::AssignArrayFn) (void (*)(A*, vesk::ssize_t, A const*, vesk::ssize_t, vesk::ssize_t)) vesk::AssignArray<A>,
-                (vesk::DestructArrayFn) (void (*)( A*, vesk::ssize_t, vesk::ssize_t)) vesk::DestructArray<A>,
-                0,
-                0,
-                0,
-                0,
-                0,
-                0
-            }
+            { sizeof(A), 0, 0, 0, ConstructArray, CopyConstructArray, AssignArray, DestructArray, 0, 0, 0, 0, 0, 0 }
         };
         
         return A_class;
     }
-    vesk::TypeOps const& _GetTypeOps(A const*)
-    {
+    vesk::TypeOps const& _GetTypeOps(A const*) {
         return vesk::GetReflectedClass<A>().m_ops;
     }
     
     // Registration of $struct+ A
-    void _Register_A()
-    {
+    void _Register_A() {
         vxVerify(vesk::RegisterReflectedClass(&_GetReflected( (A*) 0),vesk::app_GetXTarget()) == vesk::NSE_OK);
     }

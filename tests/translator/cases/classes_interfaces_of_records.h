@@ -1,3 +1,3 @@
 @import "Vesk/vxObject/IObject.h"
-$interface+ I : vesk::IPersistable { }; $interface J : vesk::IObject { };
-$warning(disable: 1013) $struct A isa J, I { };
+$interface+ I : vesk::IPersistable { }; $interface J : vesk::IObject { }; $interface+ K : J { };
+$warning(disable: 1013) $struct A isa K, I { };

@@ -1,8 +1,3 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
 template <class T>
 struct A
 { T* f(T t, xmap<T,T> m); 
@@ -18,4 +13,3 @@ template<typename Archive> inline void Deserialise(Archive& _ar,A<T>& _x) { _x.D
 template <class T> inline vesk::xostream& operator<<(vesk::xostream& _os,A<T> const& _x) { ((A<T>&)_x).Write(_os); return _os; }
 
 inline T* __stdcall f(A* _self,T t,vesk::xmap<T,T > m) { return _self->f(t,m); }
-#endif // include guard

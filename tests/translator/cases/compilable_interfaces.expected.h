@@ -1,18 +1,10 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
 typedef vesk::Array<vesk::int32,3> Three;
-inline vesk::ConstStringZ GetTypedefName_Three()
-{
+inline vesk::ConstStringZ GetTypedefName_Three() {
     return "Three";
 }
 
-struct I
-{
-    struct FnTable
-    {
+struct I {
+    struct FnTable {
         void (__stdcall *Get)(void* _self,vesk::int32& n);
     };
     I(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
@@ -20,13 +12,10 @@ struct I
     void AssignFrom(I& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
     void AssignFrom(I const& _rhs) const { const_cast<I*>(this)->m_self = _rhs.m_self; const_cast<I*>(this)->m_table = _rhs.m_table; }
     
-    template<typename T> struct Stubs
-    {
+    template<typename T> struct Stubs {
         static void __stdcall Get(void* _self,vesk::int32& n) { ((T*)_self)->Get(n); }
-        static const FnTable& GetTable()
-        {
-            static const FnTable t =
-            {
+        static const FnTable& GetTable() {
+            static const FnTable t = {
                 &Get
             };
             return t;
@@ -38,41 +27,29 @@ struct I
     
     void Get(vesk::int32& n) { m_table->Get(m_self,n); }
     
-    union
-    {
+    union {
         void* m_self;
     };
     FnTable const* m_table;
 };
 template <typename BC>
-struct IDelegatorMixin : public BC
-{
+struct IDelegatorMixin : public BC {
     void Get(vesk::int32& n) { BC::GetI().Get(n); }
 };
 
 inline vesk::ConstStringZ _GetIpcInterfaceName(I const*) { return "I"; }
 
-namespace vesk
-{
-template<> struct TypeTraits<I>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<I> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_interface; static const bool has_metadata = 0;
 };
-template<> struct InterfaceTypeTraits<I>
-{
-    static const bool is_ipc = true;
-    static const bool is_rmi = false;
+template<> struct InterfaceTypeTraits<I> {
+    static const bool is_ipc = true; static const bool is_rmi = false;
 };
 } // namespace vesk
 
-struct J
-{
-    struct FnTable
-    {
+struct J {
+    struct FnTable {
         vesk::string8 (__stdcall *Gets)(void const* _self);
         void (__stdcall *Sets)(void* _self,vesk::string8 s);
         Three (__stdcall *Gett)(void const* _self);
@@ -88,8 +65,7 @@ struct J
     void AssignFrom(J& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
     void AssignFrom(J const& _rhs) const { const_cast<J*>(this)->m_self = _rhs.m_self; const_cast<J*>(this)->m_table = _rhs.m_table; }
     
-    template<typename T> struct Stubs
-    {
+    template<typename T> struct Stubs {
         static vesk::string8 __stdcall Gets(void const* _self) { return ((const T*)_self)->Gets(); }
         static void __stdcall Sets(void* _self,vesk::string8 s) { ((T*)_self)->Sets(s); }
         static Three __stdcall Gett(void const* _self) { return ((const T*)_self)->Gett(); }
@@ -99,10 +75,8 @@ struct J
         static void __stdcall InsertIntov(void* _self,vesk::int32 di,vesk::xvector<vesk::int32>& src,vesk::int32 si1,vesk::int32 si2) { ((T*)_self)->InsertIntov(di,src,si1,si2); }
         static vesk::int32 __stdcall GetvElement(void const* _self,vesk::int32 _k0) { return ((const T*)_self)->GetvElement(_k0); }
         static void __stdcall SetvElement(void* _self,vesk::int32 _k0,vesk::int32 e) { ((T*)_self)->SetvElement(_k0,e); }
-        static const FnTable& GetTable()
-        {
-            static const FnTable t =
-            {
+        static const FnTable& GetTable() {
+            static const FnTable t = {
                 &Gets,
                 &Sets,
                 &Gett,
@@ -130,15 +104,12 @@ struct J
     vesk::int32 GetvElement(vesk::int32 _k0) const { return m_table->GetvElement(m_self,_k0); }
     void SetvElement(vesk::int32 _k0,vesk::int32 e) { m_table->SetvElement(m_self,_k0,e); }
     
-    union
-    {
-        struct
-        {
+    union {
+        struct {
             operator vesk::string8() const { return CONST_ATTRIB_CAST(J,s)->Gets(); }
             void operator=(vesk::string8 const& _v) { ATTRIB_CAST(J,s)->Sets(_v); }
         } s;
-        struct
-        {
+        struct {
             operator vesk::Array<vesk::int32,3>() const { return CONST_ATTRIB_CAST(J,t)->Gett(); }
         } t;
         void* m_self;
@@ -146,8 +117,7 @@ struct J
     FnTable const* m_table;
 };
 template <typename BC>
-struct JDelegatorMixin : public BC
-{
+struct JDelegatorMixin : public BC {
     vesk::string8 Gets() const { return BC::GetJ().Gets(); }
     void Sets(vesk::string8 s) { BC::GetJ().Sets(s); }
     Three Gett() const { return BC::GetJ().Gett(); }
@@ -159,22 +129,12 @@ struct JDelegatorMixin : public BC
     void SetvElement(vesk::int32 _k0,vesk::int32 e) { BC::GetJ().SetvElement(_k0,e); }
 };
 
-namespace vesk
-{
-template<> struct TypeTraits<J>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<J> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_interface; static const bool has_metadata = 0;
 };
-template<> struct InterfaceTypeTraits<J>
-{
-    static const bool is_ipc = false;
-    static const bool is_rmi = false;
+template<> struct InterfaceTypeTraits<J> {
+    static const bool is_ipc = false; static const bool is_rmi = false;
 };
 } // namespace vesk
 
-
-#endif // include guard

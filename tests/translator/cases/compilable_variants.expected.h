@@ -1,37 +1,22 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-enum E : int
-{
+enum E : int {
     a
 };
 template<typename Archive> inline void Serialise(Archive& _ar,E _x) { vesk::SerialiseVariableLengthUint(_ar, (int)_x); }
 template<typename Archive> inline void Deserialise(Archive& _ar,E& _x) { vesk::DeserialiseVariableLengthUint(_ar, (int&)_x); }
 
-namespace vesk
-{
-template<> struct TypeTraits<E>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_enum;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<E> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_enum; static const bool has_metadata = 0;
 };
 } // namespace vesk
 
-class V
-{
+class V {
     public:
-    V()
-    {
+    V() {
         new (this) V(int32(1));
     }
     
-    struct none
-    {
+    struct none {
         enum { tag=2 };
         none() {}
         bool operator==(none const& _rhs) const { return true; }
@@ -41,8 +26,7 @@ class V
         template<typename Archive> void Deserialise(Archive& _ar) { (void)_ar; }
         typedef none Value;
     };
-    struct text
-    {
+    struct text {
         enum { tag=3 };
         text() {}
         text(vesk::string8 const& t_) : t(t_) {}
@@ -55,36 +39,30 @@ class V
         vesk::string8 t;
     };
     template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
-    V(vesk::int32 const& _rhs)
-    {
+    V(vesk::int32 const& _rhs) {
         _tag = 0;
         new (_data) vesk::int32(_rhs);
     }
-    V(E const& _rhs)
-    {
+    V(E const& _rhs) {
         _tag = 1;
         new (_data) E(_rhs);
     }
-    V(none const& _rhs)
-    {
+    V(none const& _rhs) {
         _tag = 2;
         new (_data) none(_rhs);
     }
-    V(text const& _rhs)
-    {
+    V(text const& _rhs) {
         _tag = 3;
         new (_data) text(_rhs);
     }
     V(V const& _rhs);
     V(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value);
     ~V();
-    V& operator=(V const& _rhs)
-    {
+    V& operator=(V const& _rhs) {
         if (this != &_rhs) { V _value(_rhs); this->~V(); new (this) V(std::move(_value)); }
         return *this;
     }
-    V& operator=(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value)
-    {
+    V& operator=(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value) {
         if (this != &_rhs) { V _value(std::move(_rhs)); this->~V(); new (this) V(std::move(_value)); }
         return *this;
     }
@@ -123,31 +101,25 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,V const& _x) { _x.V
 inline vesk::xostream& operator<<(vesk::xostream& _os,V const& _x) { _x.Write(_os); return _os; }
 template<typename Archive> inline void Serialise(Archive& _ar,V const& _x) { _x.Serialise(_ar); }
 template<typename Archive> inline void Deserialise(Archive& _ar,V & _x) { _x.Deserialise(_ar); }
-inline V::V(V const& _rhs)
-{
+inline V::V(V const& _rhs) {
     _tag = _rhs._tag;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::int32(_rhs.as<vesk::int32 >()); break;
         case 1 : new (_data) E(_rhs.as<E >()); break;
         case 2 : new (_data) none(_rhs.as<none >()); break;
         case 3 : new (_data) text(_rhs.as<text >()); break;
     }
 }
-inline V::~V()
-{
-    switch(_tag)
-    {
+inline V::~V() {
+    switch(_tag) {
         case 2 : as<none >().~none(); break;
         case 3 : as<text >().~text(); break;
     }
 }
-inline V::V(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value)
-{
+inline V::V(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >::value && std::is_nothrow_move_constructible<E >::value && std::is_nothrow_move_constructible<none >::value && std::is_nothrow_move_constructible<text >::value) {
     const vesk::int32 _new = _rhs._tag;
     _tag = -1;
-    switch(_new)
-    {
+    switch(_new) {
         case 0 : new (_data) vesk::int32(std::move(_rhs.as<vesk::int32 >())); break;
         case 1 : new (_data) E(std::move(_rhs.as<E >())); break;
         case 2 : new (_data) none(std::move(_rhs.as<none >())); break;
@@ -155,11 +127,9 @@ inline V::V(V&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::int32 >:
     }
     _tag = _new;
 }
-inline V::V(vesk::int32 _new,vesk::NullInterface)
-{
+inline V::V(vesk::int32 _new,vesk::NullInterface) {
     _tag = -1;
-    switch(_new)
-    {
+    switch(_new) {
         case 0 : new (_data) vesk::int32(); break;
         case 1 : new (_data) E(); break;
         case 2 : new (_data) none(); break;
@@ -167,11 +137,9 @@ inline V::V(vesk::int32 _new,vesk::NullInterface)
     }
     _tag = _new;
 }
-inline bool V::operator==(V const& _rhs) const
-{
+inline bool V::operator==(V const& _rhs) const {
     if (_tag != _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::int32 >() == _rhs.as<vesk::int32 >();
         case 1 : return as<E >() == _rhs.as<E >();
         case 2 : return as<none >() == _rhs.as<none >();
@@ -179,12 +147,10 @@ inline bool V::operator==(V const& _rhs) const
     }
     return true;
 }
-inline bool V::operator<(V const& _rhs) const
-{
+inline bool V::operator<(V const& _rhs) const {
     if (_tag < _rhs._tag) return true;
     if (_tag > _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::int32 >() < _rhs.as<vesk::int32 >();
         case 1 : return as<E >() < _rhs.as<E >();
         case 2 : return as<none >() < _rhs.as<none >();
@@ -192,10 +158,8 @@ inline bool V::operator<(V const& _rhs) const
     }
     return false;
 }
-inline void V::Write(vesk::xostream& _os) const
-{
-    switch(_tag)
-    {
+inline void V::Write(vesk::xostream& _os) const {
+    switch(_tag) {
         case 0 : _os << as<vesk::int32 >(); break;
         case 1 : _os << as<E >(); break;
         case 2 : as<none >().Write(_os); break;
@@ -203,30 +167,24 @@ inline void V::Write(vesk::xostream& _os) const
         default: vxAssert(0);
     }
 }
-inline void V::VisitObjects(vesk::IObjectVisitor& _v) const
-{
+inline void V::VisitObjects(vesk::IObjectVisitor& _v) const {
 }
-inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const
-{
+inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const {
 }
-template<typename Archive> inline void V::Serialise(Archive& _ar) const
-{
+template<typename Archive> inline void V::Serialise(Archive& _ar) const {
     vesk::SerialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : _ar << as<vesk::int32 >(); break;
         case 1 : _ar << as<E >(); break;
         case 2 : as<none >().Serialise(_ar); break;
         case 3 : as<text >().Serialise(_ar); break;
     }
 }
-template<typename Archive> inline void V::Deserialise(Archive& _ar)
-{
+template<typename Archive> inline void V::Deserialise(Archive& _ar) {
     vesk::int32 _new;
     vesk::DeserialiseVariableLengthUint(_ar,_new);
     V _value(_new,vesk::null);
-    switch(_new)
-    {
+    switch(_new) {
         case 0 : _ar >> _value.as<vesk::int32 >(); break;
         case 1 : _ar >> _value.as<E >(); break;
         case 2 : _value.as<none >().Deserialise(_ar); break;
@@ -235,25 +193,16 @@ template<typename Archive> inline void V::Deserialise(Archive& _ar)
     *this = std::move(_value);
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<V>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_variant;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<V> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_variant; static const bool has_metadata = 0;
 };
 } // namespace vesk
 
-void F(V v,V w)
-{
-        switch(v.GetTag())
-        {
+void F(V v,V w) {
+        switch(v.GetTag()) {
         case 0 :
-            switch(w.GetTag())
-            {
+            switch(w.GetTag()) {
             case 0 : F(v.as<vesk::int32>(),w.as<vesk::int32>()); break;
             case 1 : F(v.as<vesk::int32>(),w.as<E>()); break;
             case 2 : F(v.as<vesk::int32>(),w.as<V::none>()); break;
@@ -262,8 +211,7 @@ void F(V v,V w)
             }
             break;
         case 1 :
-            switch(w.GetTag())
-            {
+            switch(w.GetTag()) {
             case 0 : F(v.as<E>(),w.as<vesk::int32>()); break;
             case 1 : F(v.as<E>(),w.as<E>()); break;
             case 2 : F(v.as<E>(),w.as<V::none>()); break;
@@ -272,8 +220,7 @@ void F(V v,V w)
             }
             break;
         case 2 :
-            switch(w.GetTag())
-            {
+            switch(w.GetTag()) {
             case 0 : F(v.as<V::none>(),w.as<vesk::int32>()); break;
             case 1 : F(v.as<V::none>(),w.as<E>()); break;
             case 2 : F(v.as<V::none>(),w.as<V::none>()); break;
@@ -282,8 +229,7 @@ void F(V v,V w)
             }
             break;
         case 3 :
-            switch(w.GetTag())
-            {
+            switch(w.GetTag()) {
             case 0 : F(v.as<V::text>(),w.as<vesk::int32>()); break;
             case 1 : F(v.as<V::text>(),w.as<E>()); break;
             case 2 : F(v.as<V::text>(),w.as<V::none>()); break;
@@ -297,42 +243,19 @@ void F(V v,V w)
 
 struct S;
 
-namespace vesk
-{
-template<> struct TypeTraits<S>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_struct;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<S> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_struct; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<S>
-{
-    static const bool has_reflected_default_ctor = 0;
-    static const bool has_reflected_dtor = 0;
-    static const bool has_reflected_copy_ctor = 0;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 0;
-    static const bool has_model = 0;
-    static const bool using_model_base_class = 0;
+template<> struct ClassTypeTraits<S> {
+    static const bool has_reflected_default_ctor = 0; static const bool has_reflected_dtor = 0; static const bool has_reflected_copy_ctor = 0; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 0; static const bool has_model = 0; static const bool using_model_base_class = 0;
 };
 } // namespace vesk
-struct S
-{
-    class N
-{
+struct S {
+    class N {
     public:
     
-    struct far
-    {
+    struct far {
         enum { tag=2 };
         far() {}
         far(E const& e_) : e(e_) {}
@@ -347,27 +270,22 @@ struct S
     template<typename _T,typename=void> struct _mapvalue_ { enum { tag=_T::tag }; typedef typename _T::Value Value; };
     template <typename _Any> struct _mapvalue_<void ,_Any> { enum { tag=0 }; typedef void Value; };
     template <typename _Any> struct _mapvalue_<vesk::string8 ,_Any> { enum { tag=1 }; typedef vesk::string8 Value; };
-    N()
-    {
+    N() {
         _tag = 0;
     }
-    N(vesk::string8 const& _rhs)
-    {
+    N(vesk::string8 const& _rhs) {
         _tag = 1;
         new (_data) vesk::string8(_rhs);
     }
-    N(far const& _rhs)
-    {
+    N(far const& _rhs) {
         _tag = 2;
         *(far**)_data = new far(_rhs);
     }
-    N& operator=(N const& _rhs)
-    {
+    N& operator=(N const& _rhs) {
         if (this != &_rhs) { N _value(_rhs); this->~N(); new (this) N(std::move(_value)); }
         return *this;
     }
-    N& operator=(N&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::string8 >::value)
-    {
+    N& operator=(N&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::string8 >::value) {
         if (this != &_rhs) { N _value(std::move(_rhs)); this->~N(); new (this) N(std::move(_value)); }
         return *this;
     }
@@ -376,97 +294,77 @@ struct S
     template<typename _T> bool is() const { return is((_T*)0); }
     template<typename _T> const typename _mapvalue_<_T>::Value& as() const { return as((_T*)0); }
     template<typename _T> typename _mapvalue_<_T>::Value& as() { return as((_T*)0); }
-    N(N const& _rhs)
-    {
+    N(N const& _rhs) {
         _tag = _rhs._tag;
-        switch(_tag)
-        {
+        switch(_tag) {
             case 1 : new (_data) vesk::string8(_rhs.as<vesk::string8 >()); break;
             case 2 : *(far**)_data = new far(_rhs.as<far >()); break;
         }
     }
-    ~N()
-    {
-        switch(_tag)
-        {
+    ~N() {
+        switch(_tag) {
             case 1 : { typedef vesk::string8 _Item; as<vesk::string8 >().~_Item(); } break;
             case 2 : delete *(far**)_data; break;
         }
     }
-    N(N&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::string8 >::value)
-    {
+    N(N&& _rhs) noexcept(std::is_nothrow_move_constructible<vesk::string8 >::value) {
         const vesk::int32 _new = _rhs._tag;
         _tag = -1;
-        switch(_new)
-        {
+        switch(_new) {
             case 1 : new (_data) vesk::string8(std::move(_rhs.as<vesk::string8 >())); break;
             case 2 : *(far**)_data = *(far**)_rhs._data; _rhs._tag = -1; break;
         }
         _tag = _new;
     }
-    N(vesk::int32 _new,vesk::NullInterface)
-    {
+    N(vesk::int32 _new,vesk::NullInterface) {
         _tag = -1;
-        switch(_new)
-        {
+        switch(_new) {
             case 1 : new (_data) vesk::string8(); break;
             case 2 : *(far**)_data = new far(); break;
         }
         _tag = _new;
     }
-    bool operator==(N const& _rhs) const
-    {
+    bool operator==(N const& _rhs) const {
         if (_tag != _rhs._tag) return false;
-        switch(_tag)
-        {
+        switch(_tag) {
             case 1 : return as<vesk::string8 >() == _rhs.as<vesk::string8 >();
             case 2 : return as<far >() == _rhs.as<far >();
         }
         return true;
     }
-    bool operator<(N const& _rhs) const
-    {
+    bool operator<(N const& _rhs) const {
         if (_tag < _rhs._tag) return true;
         if (_tag > _rhs._tag) return false;
-        switch(_tag)
-        {
+        switch(_tag) {
             case 1 : return as<vesk::string8 >() < _rhs.as<vesk::string8 >();
             case 2 : return as<far >() < _rhs.as<far >();
         }
         return false;
     }
-    void Write(vesk::xostream& _os) const
-    {
-        switch(_tag)
-        {
+    void Write(vesk::xostream& _os) const {
+        switch(_tag) {
             case 0 : _os << "void"; break;
             case 1 : _os << as<vesk::string8 >(); break;
             case 2 : as<far >().Write(_os); break;
             default: vxAssert(0);
         }
     }
-    void VisitObjects(vesk::IObjectVisitor& _v) const
-    {
+    void VisitObjects(vesk::IObjectVisitor& _v) const {
     }
-    void VisitPrefs(vesk::IPrefVisitor& _v) const
-    {
+    void VisitPrefs(vesk::IPrefVisitor& _v) const {
     }
-    template<typename Archive> void Serialise(Archive& _ar) const
-    {
+    template<typename Archive> void Serialise(Archive& _ar) const {
         vesk::SerialiseVariableLengthUint(_ar,_tag);
-        switch(_tag)
-        {
+        switch(_tag) {
             case 1 : _ar << as<vesk::string8 >(); break;
             case 2 : as<far >().Serialise(_ar); break;
         }
     }
-    template<typename Archive> void Deserialise(Archive& _ar)
-    {
+    template<typename Archive> void Deserialise(Archive& _ar) {
         vesk::int32 _new;
         vesk::DeserialiseVariableLengthUint(_ar,_new);
         N _value(_new,vesk::null);
-        switch(_new)
-        {
+        switch(_new) {
             case 1 : _ar >> _value.as<vesk::string8 >(); break;
             case 2 : _value.as<far >().Deserialise(_ar); break;
         }
@@ -492,8 +390,7 @@ friend inline vesk::xostream& operator<<(vesk::xostream& _os,N const& _x) { _x.W
 template<typename Archive> friend inline void Serialise(Archive& _ar,N const& _x) { _x.Serialise(_ar); }
 template<typename Archive> friend inline void Deserialise(Archive& _ar,N & _x) { _x.Deserialise(_ar); }
 
-    class G
-{
+    class G {
 public:
     typedef void (__stdcall *STUB_FN)(void* _self);
     G() : m_self(nullptr), m_stubFn(nullptr) {}
@@ -524,5 +421,3 @@ public:
 };
 
 
-
-#endif // include guard

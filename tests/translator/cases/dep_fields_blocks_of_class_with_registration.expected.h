@@ -1,41 +1,15 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
 namespace n { class S;
 
 } //n
-namespace vesk
-{
-template<> struct TypeTraits<n::S>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_class;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<n::S> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_class; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<n::S>
-{
-    static const bool has_reflected_default_ctor = 1;
-    static const bool has_reflected_dtor = 1;
-    static const bool has_reflected_copy_ctor = 1;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 0;
-    static const bool has_model = 0;
-    static const bool using_model_base_class = 0;
+template<> struct ClassTypeTraits<n::S> {
+    static const bool has_reflected_default_ctor = 1; static const bool has_reflected_dtor = 1; static const bool has_reflected_copy_ctor = 1; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 0; static const bool has_model = 0; static const bool using_model_base_class = 0;
 };
 } // namespace vesk
-namespace n
-{
+namespace n {
 class S
 {//
 void EvictDgsNodes_extra() const;
@@ -45,8 +19,7 @@ void VisitObjects(vesk::IObjectVisitor& v) const;
 
 
 public:
-    void EvictDgsNodes() const
-    {
+    void EvictDgsNodes() const {
         EvictDgsNodes_extra();
     }
     
@@ -58,5 +31,3 @@ vesk::TypeOps const& _GetTypeOps(S const*);
 
 inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,S const& _x) { _x.VisitObjects(_v); return _v; }
  }
-
-#endif // include guard

@@ -1,16 +1,9 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
 template <typename BC>
-struct S : public BC
-{
+struct S : public BC {
     typedef BC BaseClass;
 //
 
-void VisitObjects(vesk::IObjectVisitor& v) const
-{
+void VisitObjects(vesk::IObjectVisitor& v) const {
     BaseClass::VisitObjects(v);
     v << x;
 }
@@ -24,5 +17,3 @@ public:
 
 template <typename BC> inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,S const& _x) { _x.VisitObjects(_v); return _v; }
 
-
-#endif // include guard

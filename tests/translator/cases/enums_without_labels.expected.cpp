@@ -2,10 +2,8 @@
 
 //### $enum+ P
 namespace vesk { XTarget* app_GetXTarget(); }
-    vesk::ReflectedEnum const& _GetReflected(P const*)
-    {
-        static const vesk::ReflectedEnum P_enum =
-        {
+    vesk::ReflectedEnum const& _GetReflected(P const*) {
+        static const vesk::ReflectedEnum P_enum = {
             "P",
             0,
             0,

@@ -1,5 +1,4 @@
 @import "Vesk/vxObject/IObject.h"
-$model R { int32 a; };
+$model R { };
 $mixin M : model R { };
 $mixin A << ar >> : model R { };
-$struct K : model R { };

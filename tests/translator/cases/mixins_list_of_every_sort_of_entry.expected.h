@@ -1,11 +1,5 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
 template <typename BC>
-struct M : public BC
-{
+struct M : public BC {
     typedef BC BaseClass;
  vesk::int32 a; 
 public:
@@ -14,13 +8,11 @@ public:
     
 };
 
-template <typename BC> vesk::TypeOps const& _GetTypeOps(M const*)
-{
+template <typename BC> vesk::TypeOps const& _GetTypeOps(M const*) {
     return vesk::GetReflectedClass<M>().m_ops;
 }
 
-struct Pos
-{
+struct Pos {
     
     Pos() : y(0) {}
     explicit Pos(bool const& y_) : y(y_) {}
@@ -29,12 +21,10 @@ struct Pos
     void EvictDgsNodes() const;
     void VisitObjects(vesk::IObjectVisitor& _v) const;
     void VisitPrefs(vesk::IPrefVisitor& _v) const;
-    bool operator<(Pos const& _rhs) const
-    {
+    bool operator<(Pos const& _rhs) const {
         return (y < _rhs.y);
     }
-    bool operator==(Pos const& _rhs) const
-    {
+    bool operator==(Pos const& _rhs) const {
         return y == _rhs.y;
     }
     bool operator!=(Pos const& _rhs) const { return !operator==(_rhs); }
@@ -53,8 +43,7 @@ struct Pos
     bool y;
 };
 template <typename BC>
-struct Pos_model_mixin : public BC
-{
+struct Pos_model_mixin : public BC {
     using typename BC::FinalClass;
     
     bool operator<(Pos_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
@@ -74,10 +63,8 @@ struct Pos_model_mixin : public BC
     bool const& Gety() const { vesk::DataSourceReadBarrier(&_model_.y,vesk::null,"Pos::_model_.y"); return _model_.y; }
     bool& Writey() { vesk::DataSourceWriteBarrier(&_model_.y,vesk::null,"Pos::_model_.y");  return _model_.y; }
     void Sety(bool const& _v) { vesk::DataSourceWriteBarrier(&_model_.y,vesk::null,"Pos::_model_.y"); _model_.y = _v; }
-    union
-    {
-        struct
-        {
+    union {
+        struct {
             operator bool const&() const { return CONST_ATTRIB_CAST(Pos_model_mixin,y)->Gety(); }
             bool const& read() const { return CONST_ATTRIB_CAST(Pos_model_mixin,y)->Gety(); }
             bool & write() { return ATTRIB_CAST(Pos_model_mixin,y)->Writey(); }
@@ -102,44 +89,22 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,Pos const& _x) { _x
 template<typename Archive> inline void Serialise(Archive& _ar,Pos const& _x) { _x.Serialise(_ar); }
 
 template<typename Archive> inline void Deserialise(Archive& _ar,Pos& _x) { _x.Deserialise(_ar); }
-inline vesk::xostream& operator<<(vesk::xostream& _os,Pos const& _x)
-{
+inline vesk::xostream& operator<<(vesk::xostream& _os,Pos const& _x) {
     _os << "Pos(" << _x.y << ')';
     return _os;
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<Pos>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_model;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<Pos> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_model; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<Pos>
-{
-    static const bool has_reflected_default_ctor = 0;
-    static const bool has_reflected_dtor = 0;
-    static const bool has_reflected_copy_ctor = 0;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 1;
-    static const bool has_model = 1;
-    static const bool using_model_base_class = 0;
+template<> struct ClassTypeTraits<Pos> {
+    static const bool has_reflected_default_ctor = 0; static const bool has_reflected_dtor = 0; static const bool has_reflected_copy_ctor = 0; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 1; static const bool has_model = 1; static const bool using_model_base_class = 0;
 };
 } // namespace vesk
 
 namespace n { template <typename BC>
-struct T : public BC
-{
+struct T : public BC {
     typedef BC BaseClass;
  
 public:
@@ -148,16 +113,14 @@ public:
 
  }
 template <typename BC>
-struct K_Mixin_0 : public BC
-{
+struct K_Mixin_0 : public BC {
     typedef BC BaseClass;
     using typename BC::FinalClass;
  bool b; int plain; 
 
 };
 
-struct K_Mixin_1_model
-{
+struct K_Mixin_1_model {
     
     K_Mixin_1_model() : z(0) {}
     explicit K_Mixin_1_model(vesk::int8 const& z_) : z(z_) {}
@@ -166,12 +129,10 @@ struct K_Mixin_1_model
     void EvictDgsNodes() const {vesk::DataSourceEvict(&z);}
     void VisitObjects(vesk::IObjectVisitor& _v) const {}
     void VisitPrefs(vesk::IPrefVisitor& _v) const {}
-    bool operator<(K_Mixin_1_model const& _rhs) const
-    {
+    bool operator<(K_Mixin_1_model const& _rhs) const {
         return (z < _rhs.z);
     }
-    bool operator==(K_Mixin_1_model const& _rhs) const
-    {
+    bool operator==(K_Mixin_1_model const& _rhs) const {
         return z == _rhs.z;
     }
     bool operator!=(K_Mixin_1_model const& _rhs) const { return !operator==(_rhs); }
@@ -190,8 +151,7 @@ struct K_Mixin_1_model
     vesk::int8 z;
 };
 template <typename BC>
-struct K_Mixin_1_model_mixin : public BC
-{
+struct K_Mixin_1_model_mixin : public BC {
     using typename BC::FinalClass;
     
     bool operator<(K_Mixin_1_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
@@ -211,10 +171,8 @@ struct K_Mixin_1_model_mixin : public BC
     vesk::int8 const& Getz() const { vesk::DataSourceReadBarrier(&_model_.z,vesk::null,"K_Mixin_1::_model_.z"); return _model_.z; }
     vesk::int8& Writez() { vesk::DataSourceWriteBarrier(&_model_.z,vesk::null,"K_Mixin_1::_model_.z");  return _model_.z; }
     void Setz(vesk::int8 const& _v) { vesk::DataSourceWriteBarrier(&_model_.z,vesk::null,"K_Mixin_1::_model_.z"); _model_.z = _v; }
-    union
-    {
-        struct
-        {
+    union {
+        struct {
             operator vesk::int8 const&() const { return CONST_ATTRIB_CAST(K_Mixin_1_model_mixin,z)->Getz(); }
             vesk::int8 const& read() const { return CONST_ATTRIB_CAST(K_Mixin_1_model_mixin,z)->Getz(); }
             vesk::int8 & write() { return ATTRIB_CAST(K_Mixin_1_model_mixin,z)->Writez(); }
@@ -233,36 +191,15 @@ struct K_Mixin_1_model_mixin : public BC
 };
 class K;
 
-namespace vesk
-{
-template<> struct TypeTraits<K>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_class;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<K> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_class; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<K>
-{
-    static const bool has_reflected_default_ctor = 1;
-    static const bool has_reflected_dtor = 1;
-    static const bool has_reflected_copy_ctor = 1;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 0;
-    static const bool has_model = 0;
-    static const bool using_model_base_class = 0;
+template<> struct ClassTypeTraits<K> {
+    static const bool has_reflected_default_ctor = 1; static const bool has_reflected_dtor = 1; static const bool has_reflected_copy_ctor = 1; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 0; static const bool has_model = 0; static const bool using_model_base_class = 0;
 };
 } // namespace vesk
-class K : public K_Mixin_1_model_mixin<n::T<other::U <Pos_model_mixin<K_Mixin_0<M<vesk::BaseMixin<K,vesk::EmptyBase> > > >,int, 3 >,char > >
-{
+class K : public K_Mixin_1_model_mixin<n::T<other::U <Pos_model_mixin<K_Mixin_0<M<vesk::BaseMixin<K,vesk::EmptyBase> > > >,int, 3 >,char > > {
 public:
     typedef K_Mixin_1_model_mixin<n::T<other::U <Pos_model_mixin<K_Mixin_0<M<vesk::BaseMixin<K,vesk::EmptyBase> > > >,int, 3 >,char > > BaseClass;
 
@@ -279,5 +216,3 @@ public:
 vesk::ReflectedClass const& _GetReflected(K const*);
 vesk::TypeOps const& _GetTypeOps(K const*);
 
-
-#endif // include guard

@@ -1,24 +1,16 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-struct M
-{
+struct M {
+    M() { s.Insert(7); }
     
-    M() {}
     explicit M(vesk::xset<vesk::int32> const& s_) : s(s_) {}
     void Serialise(vesk::Archive&) const;
     void Deserialise(vesk::InputArchive&);
     void EvictDgsNodes() const;
     void VisitObjects(vesk::IObjectVisitor& _v) const;
     void VisitPrefs(vesk::IPrefVisitor& _v) const;
-    bool operator<(M const& _rhs) const
-    {
+    bool operator<(M const& _rhs) const {
         return (s < _rhs.s);
     }
-    bool operator==(M const& _rhs) const
-    {
+    bool operator==(M const& _rhs) const {
         return s == _rhs.s;
     }
     bool operator!=(M const& _rhs) const { return !operator==(_rhs); }
@@ -39,8 +31,7 @@ struct M
     vesk::xset<vesk::int32> s;
 };
 template <typename BC>
-struct M_model_mixin : public BC
-{
+struct M_model_mixin : public BC {
     using typename BC::FinalClass;
     
     bool operator<(M_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
@@ -62,22 +53,18 @@ struct M_model_mixin : public BC
     static vesk::Path GetsElementPath(vesk::int32 const& _k0) { vesk::Path _path; GetsElementPath(_path,_k0); return _path; }
     bool InsertIntos(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Insert(_k0); }
     bool DeleteFroms(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Delete(_k0); }
-    union
-    {
-        struct
-        {
+    union {
+        struct {
             operator vesk::xset<vesk::int32> const&() const { return CONST_ATTRIB_CAST(M_model_mixin,s)->Gets(); }
             vesk::xset<vesk::int32> const& read() const { return CONST_ATTRIB_CAST(M_model_mixin,s)->Gets(); }
             vesk::xset<vesk::int32> & write() { return ATTRIB_CAST(M_model_mixin,s)->Writes(); }
             vesk::xset<vesk::int32> const& model() const { return CONST_ATTRIB_CAST(M_model_mixin,s)->_model__s(); }
             vesk::xset<vesk::int32>& model() { return ATTRIB_CAST(M_model_mixin,s)->_model__s(); }
             vesk::Path path() const { return CONST_ATTRIB_CAST(M_model_mixin,s)->GetsPath(); }
-            bool Insert(vesk::int32 const& _key)
-            {
+            bool Insert(vesk::int32 const& _key) {
                 return ATTRIB_CAST(M_model_mixin,s)->InsertIntos(_key);
             }
-            bool Delete(vesk::int32 const& _key)
-            {
+            bool Delete(vesk::int32 const& _key) {
                 return ATTRIB_CAST(M_model_mixin,s)->DeleteFroms(_key);
             }
         } s;
@@ -97,44 +84,22 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,M const& _x) { _x.V
 template<typename Archive> inline void Serialise(Archive& _ar,M const& _x) { _x.Serialise(_ar); }
 
 template<typename Archive> inline void Deserialise(Archive& _ar,M& _x) { _x.Deserialise(_ar); }
-inline vesk::xostream& operator<<(vesk::xostream& _os,M const& _x)
-{
+inline vesk::xostream& operator<<(vesk::xostream& _os,M const& _x) {
     _os << "M(" << _x.s << ')';
     return _os;
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<M>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_model;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<M> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_model; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<M>
-{
-    static const bool has_reflected_default_ctor = 0;
-    static const bool has_reflected_dtor = 0;
-    static const bool has_reflected_copy_ctor = 0;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 1;
-    static const bool has_model = 1;
-    static const bool using_model_base_class = 0;
+template<> struct ClassTypeTraits<M> {
+    static const bool has_reflected_default_ctor = 0; static const bool has_reflected_dtor = 0; static const bool has_reflected_copy_ctor = 0; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 1; static const bool has_model = 1; static const bool using_model_base_class = 0;
 };
 } // namespace vesk
 
 template <typename BC>
-struct K_model_mixin : public BC
-{
+struct K_model_mixin : public BC {
     using typename BC::FinalClass;
     
     bool operator<(K_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
@@ -156,22 +121,18 @@ struct K_model_mixin : public BC
     static vesk::Path GetsElementPath(vesk::int32 const& _k0) { vesk::Path _path; GetsElementPath(_path,_k0); return _path; }
     bool InsertIntos(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Insert(_k0); }
     bool DeleteFroms(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Delete(_k0); }
-    union
-    {
-        struct
-        {
+    union {
+        struct {
             operator vesk::xset<vesk::int32> const&() const { return CONST_ATTRIB_CAST(K_model_mixin,s)->Gets(); }
             vesk::xset<vesk::int32> const& read() const { return CONST_ATTRIB_CAST(K_model_mixin,s)->Gets(); }
             vesk::xset<vesk::int32> & write() { return ATTRIB_CAST(K_model_mixin,s)->Writes(); }
             vesk::xset<vesk::int32> const& model() const { return CONST_ATTRIB_CAST(K_model_mixin,s)->_model__s(); }
             vesk::xset<vesk::int32>& model() { return ATTRIB_CAST(K_model_mixin,s)->_model__s(); }
             vesk::Path path() const { return CONST_ATTRIB_CAST(K_model_mixin,s)->GetsPath(); }
-            bool Insert(vesk::int32 const& _key)
-            {
+            bool Insert(vesk::int32 const& _key) {
                 return ATTRIB_CAST(K_model_mixin,s)->InsertIntos(_key);
             }
-            bool Delete(vesk::int32 const& _key)
-            {
+            bool Delete(vesk::int32 const& _key) {
                 return ATTRIB_CAST(K_model_mixin,s)->DeleteFroms(_key);
             }
         } s;
@@ -185,36 +146,15 @@ struct K_model_mixin : public BC
 };
 class K;
 
-namespace vesk
-{
-template<> struct TypeTraits<K>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_class;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<K> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_class; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<K>
-{
-    static const bool has_reflected_default_ctor = 1;
-    static const bool has_reflected_dtor = 1;
-    static const bool has_reflected_copy_ctor = 1;
-    static const bool has_reflected_equality = 1;
-    static const bool has_reflected_compare = 1;
-    static const bool has_reflected_write_xostream = 1;
-    static const bool has_reflected_serialise = 1;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 0;
-    static const bool has_model = 0;
-    static const bool using_model_base_class = 1;
+template<> struct ClassTypeTraits<K> {
+    static const bool has_reflected_default_ctor = 1; static const bool has_reflected_dtor = 1; static const bool has_reflected_copy_ctor = 1; static const bool has_reflected_equality = 1; static const bool has_reflected_compare = 1; static const bool has_reflected_write_xostream = 1; static const bool has_reflected_serialise = 1; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 0; static const bool has_model = 0; static const bool using_model_base_class = 1;
 };
 } // namespace vesk
-class K : public K_model_mixin<vesk::BaseMixin<K,vesk::EmptyBase>>
-{
+class K : public K_model_mixin<vesk::BaseMixin<K,vesk::EmptyBase>> {
 public:
     typedef K_model_mixin<vesk::BaseMixin<K,vesk::EmptyBase>> BaseClass;
 
@@ -240,5 +180,3 @@ template<typename Archive> inline void Deserialise(Archive& _ar,K& _x) { _x.Dese
 
 inline vesk::xostream& operator<<(vesk::xostream& _os,K const& _x) { _os << _x._model_; return _os; }
 
-
-#endif // include guard

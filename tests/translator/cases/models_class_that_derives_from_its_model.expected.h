@@ -1,12 +1,5 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-struct I
-{
-    struct FnTable
-    {
+struct I {
+    struct FnTable {
         vesk::IObject::FnTable _IObject;
     };
     I(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
@@ -14,13 +7,9 @@ struct I
     void AssignFrom(I& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
     void AssignFrom(I const& _rhs) const { const_cast<I*>(this)->m_self = _rhs.m_self; const_cast<I*>(this)->m_table = _rhs.m_table; }
     
-    template<typename T> struct Stubs
-    {
-        static const FnTable& GetTable()
-        {
-            static const FnTable t =
-            {
-                {
+    template<typename T> struct Stubs {
+        static const FnTable& GetTable() {
+            static const FnTable t = { {
                 },
             };
             return t;
@@ -33,40 +22,29 @@ struct I
     
     operator vesk::IObject() const { return vesk::IObject(m_self, &m_table->_IObject); }
     
-    union
-    {
+    union {
         void* m_self;
     };
     FnTable const* m_table;
 };
 template <typename BC>
-struct IDelegatorMixin : public BC
-{
+struct IDelegatorMixin : public BC {
 };
 
 vesk::ReflectedInterface const& _GetReflected(I const*);
 
-namespace vesk
-{
-template<> struct TypeTraits<I>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<I> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_interface; static const bool has_metadata = 0;
 };
-template<> struct InterfaceTypeTraits<I>
-{
-    static const bool is_ipc = false;
-    static const bool is_rmi = false;
+template<> struct InterfaceTypeTraits<I> {
+    static const bool is_ipc = false; static const bool is_rmi = false;
 };
 template<> struct _is_direct_superinterface_of<vesk::IObject,I> { static const bool value = true; };
 } // namespace vesk
 
 struct S;
-struct S_model
-{
+struct S_model {
     
     S_model() : n(0) {}
     S_model(vesk::pref<I> const& p_,vesk::int32 const& n_) : p(p_),n(n_) {}
@@ -74,13 +52,11 @@ struct S_model
     void Deserialise(vesk::InputArchive&);
     void VisitObjects(vesk::IObjectVisitor& _v) const;
     void VisitPrefs(vesk::IPrefVisitor& _v) const;
-    bool operator<(S_model const& _rhs) const
-    {
+    bool operator<(S_model const& _rhs) const {
         return (p < _rhs.p || (p == _rhs.p &&
         (n < _rhs.n)));
     }
-    bool operator==(S_model const& _rhs) const
-    {
+    bool operator==(S_model const& _rhs) const {
         return p == _rhs.p &&
         n == _rhs.n;
     }
@@ -109,8 +85,7 @@ struct S_model
     vesk::int32 n;
 };
 template <typename BC>
-struct S_model_mixin : public BC
-{
+struct S_model_mixin : public BC {
     using typename BC::FinalClass;
     
     bool operator<(S_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
@@ -136,10 +111,8 @@ struct S_model_mixin : public BC
     vesk::int32& _model__n() { return _model_.n; }
     vesk::int32 const& Getn() const { vesk::IndepFieldReadBarrier(static_cast<const typename BC::FinalClass*>(this),GetnPath()); return _model_.n; }
     void Setn(vesk::int32 const& _v) { vesk::genop_Assign(static_cast<typename BC::FinalClass*>(this),GetnPath(),_model_.n,_v); }
-    union
-    {
-        struct
-        {
+    union {
+        struct {
             operator vesk::pref<I> const&() const { return CONST_ATTRIB_CAST(S_model_mixin,p)->Getp(); }
             vesk::pref<I> const& read() const { return CONST_ATTRIB_CAST(S_model_mixin,p)->Getp(); }
             vesk::pref<I> const& model() const { return CONST_ATTRIB_CAST(S_model_mixin,p)->_model__p(); }
@@ -150,8 +123,7 @@ struct S_model_mixin : public BC
             vesk::ptr<I > Get() const { return CONST_ATTRIB_CAST(S_model_mixin,p)->Getp().Get(); }
             void operator=(vesk::pref<I> const& _v) { ATTRIB_CAST(S_model_mixin,p)->Setp(_v); }
         } p;
-        struct
-        {
+        struct {
             operator vesk::int32 const&() const { return CONST_ATTRIB_CAST(S_model_mixin,n)->Getn(); }
             vesk::int32 const& read() const { return CONST_ATTRIB_CAST(S_model_mixin,n)->Getn(); }
             vesk::int32 const& model() const { return CONST_ATTRIB_CAST(S_model_mixin,n)->_model__n(); }
@@ -167,38 +139,17 @@ struct S_model_mixin : public BC
     S_model _model_;
 };
 
-namespace vesk
-{
-template<> struct TypeTraits<S>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_struct;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<S> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_struct; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<S>
-{
-    static const bool has_reflected_default_ctor = 1;
-    static const bool has_reflected_dtor = 1;
-    static const bool has_reflected_copy_ctor = 1;
-    static const bool has_reflected_equality = 1;
-    static const bool has_reflected_compare = 1;
-    static const bool has_reflected_write_xostream = 1;
-    static const bool has_reflected_serialise = 1;
-    static const bool has_reflected_visit_IObjects = 1;
-    static const bool has_reflected_visit_Prefs = 1;
-    static const bool implements_IObject = 1;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 1;
-    static const bool has_model = 1;
-    static const bool using_model_base_class = 1;
+template<> struct ClassTypeTraits<S> {
+    static const bool has_reflected_default_ctor = 1; static const bool has_reflected_dtor = 1; static const bool has_reflected_copy_ctor = 1; static const bool has_reflected_equality = 1; static const bool has_reflected_compare = 1; static const bool has_reflected_write_xostream = 1; static const bool has_reflected_serialise = 1; static const bool has_reflected_visit_IObjects = 1; static const bool has_reflected_visit_Prefs = 1; static const bool implements_IObject = 1; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 1; static const bool has_model = 1; static const bool using_model_base_class = 1;
 };
 template<> struct directly_implements_interface<S,I> { static const bool value = true; };
 template<> struct indirectly_implements_interface<S,vesk::IObject> { static const bool value = true; };
 } // namespace vesk
-struct S : public S_model_mixin<vesk::IObjectBaseMixin<S,vesk::EmptyBase>>
-{
+struct S : public S_model_mixin<vesk::IObjectBaseMixin<S,vesk::EmptyBase>> {
     typedef S_model_mixin<vesk::IObjectBaseMixin<S,vesk::EmptyBase>> BaseClass;
  
 public:
@@ -220,8 +171,7 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,S const& _x) { _x.V
 template<typename Archive> inline void Serialise(Archive& _ar,S const& _x) { _x.Serialise(_ar); }
 
 template<typename Archive> inline void Deserialise(Archive& _ar,S& _x) { _x.Deserialise(_ar); }
-inline vesk::xostream& operator<<(vesk::xostream& _os,S const& _x)
-{
+inline vesk::xostream& operator<<(vesk::xostream& _os,S const& _x) {
     _os << "S\n";
     vesk::ScopeWriter2 sw(_os);
     _os << "p = " << _x._model_.p << '\n';
@@ -229,5 +179,3 @@ inline vesk::xostream& operator<<(vesk::xostream& _os,S const& _x)
     return _os;
 }
 
-
-#endif // include guard

@@ -1,36 +1,11 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
 struct S;
 
-namespace vesk
-{
-template<> struct TypeTraits<S>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_struct;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<S> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_struct; static const bool has_metadata = 0;
 };
-template<> struct ClassTypeTraits<S>
-{
-    static const bool has_reflected_default_ctor = 1;
-    static const bool has_reflected_dtor = 1;
-    static const bool has_reflected_copy_ctor = 1;
-    static const bool has_reflected_equality = 0;
-    static const bool has_reflected_compare = 0;
-    static const bool has_reflected_write_xostream = 0;
-    static const bool has_reflected_serialise = 0;
-    static const bool has_reflected_visit_IObjects = 0;
-    static const bool has_reflected_visit_Prefs = 0;
-    static const bool implements_IObject = 0;
-    static const bool implements_IPersistable = 0;
-    static const bool can_serialise_model = 0;
-    static const bool has_model = 0;
-    static const bool using_model_base_class = 0;
+template<> struct ClassTypeTraits<S> {
+    static const bool has_reflected_default_ctor = 1; static const bool has_reflected_dtor = 1; static const bool has_reflected_copy_ctor = 1; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 0; static const bool has_model = 0; static const bool using_model_base_class = 0;
 };
 } // namespace vesk
 struct S
@@ -90,5 +65,3 @@ template<typename Archive> inline void Serialise(Archive& _ar,S const& _x) { _x.
 
 template<typename Archive> inline void Deserialise(Archive& _ar,S& _x) { _x.Deserialise(_ar); }
 
-
-#endif // include guard

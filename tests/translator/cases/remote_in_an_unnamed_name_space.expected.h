@@ -1,22 +1,13 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-namespace { struct J
-{
-    struct FnTable
-    {
+namespace { namespace n { struct J {
+    struct FnTable {
     };
     J(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
     
     void AssignFrom(J& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
     void AssignFrom(J const& _rhs) const { const_cast<J*>(this)->m_self = _rhs.m_self; const_cast<J*>(this)->m_table = _rhs.m_table; }
     
-    template<typename T> struct Stubs
-    {
-        static const FnTable& GetTable()
-        {
+    template<typename T> struct Stubs {
+        static const FnTable& GetTable() {
             static const FnTable t = {};
             return t;
         }
@@ -26,96 +17,27 @@ namespace { struct J
     template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<J*>(this)->m_self = const_cast<T*>(_rhs); const_cast<J*>(this)->m_table = &Stubs<T>::GetTable(); }
     
     
-    union
-    {
+    union {
         void* m_self;
     };
     FnTable const* m_table;
 };
 template <typename BC>
-struct JDelegatorMixin : public BC
-{
+struct JDelegatorMixin : public BC {
 };
 
-inline vesk::ConstStringZ _GetIpcInterfaceName(J const*) { return "J"; }
-
-} //
-namespace vesk
-{
-template<> struct TypeTraits<J>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 0;
-};
-template<> struct InterfaceTypeTraits<J>
-{
-    static const bool is_ipc = true;
-    static const bool is_rmi = false;
-};
-} // namespace vesk
-namespace 
-{
- namespace n { struct K
-{
-    struct FnTable
-    {
-    };
-    K(void* _self, const FnTable* table) : m_self(_self), m_table(table) {}
-    
-    void AssignFrom(K& _rhs) { m_self = _rhs.m_self; m_table = _rhs.m_table; }
-    void AssignFrom(K const& _rhs) const { const_cast<K*>(this)->m_self = _rhs.m_self; const_cast<K*>(this)->m_table = _rhs.m_table; }
-    
-    template<typename T> struct Stubs
-    {
-        static const FnTable& GetTable()
-        {
-            static const FnTable t = {};
-            return t;
-        }
-    };
-    
-    template<typename T> void CoerceFrom(T* _rhs) { m_self = _rhs; m_table = &Stubs<T>::GetTable(); }
-    template<typename T> void CoerceFrom(const T* _rhs) const { const_cast<K*>(this)->m_self = const_cast<T*>(_rhs); const_cast<K*>(this)->m_table = &Stubs<T>::GetTable(); }
-    
-    
-    union
-    {
-        void* m_self;
-    };
-    FnTable const* m_table;
-};
-template <typename BC>
-struct KDelegatorMixin : public BC
-{
-};
-
-inline vesk::ConstStringZ _GetIpcInterfaceName(K const*) { return "n::K"; }
+inline vesk::ConstStringZ _GetIpcInterfaceName(J const*) { return "n::J"; }
 
 } //n
 } //
-namespace vesk
-{
-template<> struct TypeTraits<n::K>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_interface;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<n::J> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_interface; static const bool has_metadata = 0;
 };
-template<> struct InterfaceTypeTraits<n::K>
-{
-    static const bool is_ipc = true;
-    static const bool is_rmi = true;
+template<> struct InterfaceTypeTraits<n::J> {
+    static const bool is_ipc = true; static const bool is_rmi = false;
 };
 } // namespace vesk
-namespace 
-{
-namespace n
-{
+namespace  {
+namespace n {
  } }
-
-#endif // include guard

@@ -1,2 +1,2 @@
 @import "Vesk/vxObject/IObject.h"
-namespace { $interface ipc J { }; namespace n { $interface rmi K { }; } }
+namespace { namespace n { $interface ipc J { }; } }

@@ -1,5 +1,5 @@
 @import "Vesk/vxObject/IObject.h"
-$model Pos { bool y; };
+$struct Pos { };
 namespace n
 {
 $interface+ ipc rmi J

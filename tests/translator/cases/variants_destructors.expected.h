@@ -1,99 +1,74 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-enum E : int
-{
+enum E : int {
     a
 };
 template<typename Archive> inline void Serialise(Archive& _ar,E _x) { vesk::SerialiseVariableLengthUint(_ar, (int)_x); }
 template<typename Archive> inline void Deserialise(Archive& _ar,E& _x) { vesk::DeserialiseVariableLengthUint(_ar, (int&)_x); }
 
-namespace vesk
-{
-template<> struct TypeTraits<E>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_enum;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<E> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_enum; static const bool has_metadata = 0;
 };
 } // namespace vesk
  namespace n { typedef vesk::xvector<vesk::int32> T;
-inline vesk::ConstStringZ GetTypedefName_T()
-{
+inline vesk::ConstStringZ GetTypedefName_T() {
     return "n::T";
 }
  }
-class V
-{
+class V {
     public:
     
-    struct t
-    {
+    struct t {
         enum { tag=1 };
         typedef n::T Value;
         t(const Value& _v) : value(_v) {}
         Value value;
     };
-    struct m
-    {
+    struct m {
         enum { tag=2 };
         typedef vesk::xmap<vesk::int32,bool > Value;
         m(const Value& _v) : value(_v) {}
         Value value;
     };
-    struct s
-    {
+    struct s {
         enum { tag=3 };
         typedef std::map<int, std::string> Value;
         s(const Value& _v) : value(_v) {}
         Value value;
     };
-    struct d
-    {
+    struct d {
         enum { tag=4 };
         typedef A<b::C>::D Value;
         d(const Value& _v) : value(_v) {}
         Value value;
     };
     template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
-    V(E const& _rhs)
-    {
+    V(E const& _rhs) {
         _tag = 0;
         new (_data) E(_rhs);
     }
-    V(t const& _rhs)
-    {
+    V(t const& _rhs) {
         _tag = 1;
         new (_data) t(_rhs);
     }
-    V(m const& _rhs)
-    {
+    V(m const& _rhs) {
         _tag = 2;
         new (_data) m(_rhs);
     }
-    V(s const& _rhs)
-    {
+    V(s const& _rhs) {
         _tag = 3;
         new (_data) s(_rhs);
     }
-    V(d const& _rhs)
-    {
+    V(d const& _rhs) {
         _tag = 4;
         new (_data) d(_rhs);
     }
-    V(vesk::int8 const& _rhs)
-    {
+    V(vesk::int8 const& _rhs) {
         _tag = 5;
         new (_data) vesk::int8(_rhs);
     }
     V(V const& _rhs);
     ~V();
-    V& operator=(V const& _rhs)
-    {
+    V& operator=(V const& _rhs) {
         if (this != &_rhs) { this->~V(); new (this) V(_rhs); }
         return *this;
     }
@@ -129,11 +104,9 @@ inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,V const& _x) { 
 inline vesk::IObjectVisitor& operator<<(vesk::IObjectVisitor& _v,V const*) { return _v; }
 inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,V const& _x) { _x.VisitPrefs(_v); return _v; }
 inline vesk::xostream& operator<<(vesk::xostream& _os,V const& _x) { _x.Write(_os); return _os; }
-inline V::V(V const& _rhs)
-{
+inline V::V(V const& _rhs) {
     _tag = _rhs._tag;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) E(_rhs.as<E >()); break;
         case 1 : new (_data) t(_rhs.as<t >()); break;
         case 2 : new (_data) m(_rhs.as<m >()); break;
@@ -142,10 +115,8 @@ inline V::V(V const& _rhs)
         case 5 : new (_data) vesk::int8(_rhs.as<vesk::int8 >()); break;
     }
 }
-inline V::~V()
-{
-    switch(_tag)
-    {
+inline V::~V() {
+    switch(_tag) {
         case 0 : as<E >().E::~E(); break;
         case 1 : as<t >().n::T::~T(); break;
         case 2 : as<m >().vesk::xmap<vesk::int32,bool >::~xmap(); break;
@@ -153,11 +124,9 @@ inline V::~V()
         case 4 : as<d >().A<b::C>::D::~D(); break;
     }
 }
-inline bool V::operator==(V const& _rhs) const
-{
+inline bool V::operator==(V const& _rhs) const {
     if (_tag != _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<E >() == _rhs.as<E >();
         case 1 : return as<t >() == _rhs.as<t >();
         case 2 : return as<m >() == _rhs.as<m >();
@@ -167,12 +136,10 @@ inline bool V::operator==(V const& _rhs) const
     }
     return true;
 }
-inline bool V::operator<(V const& _rhs) const
-{
+inline bool V::operator<(V const& _rhs) const {
     if (_tag < _rhs._tag) return true;
     if (_tag > _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<E >() < _rhs.as<E >();
         case 1 : return as<t >() < _rhs.as<t >();
         case 2 : return as<m >() < _rhs.as<m >();
@@ -182,10 +149,8 @@ inline bool V::operator<(V const& _rhs) const
     }
     return false;
 }
-inline void V::Write(vesk::xostream& _os) const
-{
-    switch(_tag)
-    {
+inline void V::Write(vesk::xostream& _os) const {
+    switch(_tag) {
         case 0 : _os << as<E >(); break;
         case 1 : _os << "t(" << as<t >() << ')'; break;
         case 2 : _os << "m(" << as<m >() << ')'; break;
@@ -195,31 +160,19 @@ inline void V::Write(vesk::xostream& _os) const
         default: vxAssert(0);
     }
 }
-inline void V::VisitObjects(vesk::IObjectVisitor& _v) const
-{
-    switch(_tag)
-    {
+inline void V::VisitObjects(vesk::IObjectVisitor& _v) const {
+    switch(_tag) {
         case 2 : _v << as<m >(); break;
     }
 }
-inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const
-{
-    switch(_tag)
-    {
+inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const {
+    switch(_tag) {
         case 2 : _v << as<m >(); break;
     }
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<V>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_variant;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<V> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_variant; static const bool has_metadata = 0;
 };
 } // namespace vesk
-
-#endif // include guard

@@ -1,37 +1,26 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-class V
-{
+class V {
     public:
-    V()
-    {
+    V() {
         new (this) V(x("a"));
     }
     
-    struct x
-    {
+    struct x {
         enum { tag=1 };
         typedef vesk::string8 Value;
         x(const Value& _v) : value(_v) {}
         Value value;
     };
-    struct none
-    {
+    struct none {
         enum { tag=2 };
         typedef void Value;
     };
-    struct ref
-    {
+    struct ref {
         enum { tag=3 };
         typedef vesk::pref<vesk::IObject> Value;
         ref(const Value& _v) : value(_v) {}
         Value value;
     };
-    struct s
-    {
+    struct s {
         enum { tag=4 };
         s() {}
         s(vesk::int32 const& a_,vesk::string8 const& b_) : a(a_),b(b_) {}
@@ -47,35 +36,29 @@ class V
     };
     struct h;
     template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
-    V(vesk::int32 const& _rhs)
-    {
+    V(vesk::int32 const& _rhs) {
         _tag = 0;
         new (_data) vesk::int32(_rhs);
     }
-    V(x const& _rhs)
-    {
+    V(x const& _rhs) {
         _tag = 1;
         new (_data) x(_rhs);
     }
-    V(none const& _rhs)
-    {
+    V(none const& _rhs) {
         _tag = 2;
     }
-    V(ref const& _rhs)
-    {
+    V(ref const& _rhs) {
         _tag = 3;
         *(ref**)_data = new ref(_rhs);
     }
-    V(s const& _rhs)
-    {
+    V(s const& _rhs) {
         _tag = 4;
         new (_data) s(_rhs);
     }
     V(h const& _rhs);
     V(V const& _rhs);
     ~V();
-    V& operator=(V const& _rhs)
-    {
+    V& operator=(V const& _rhs) {
         if (this != &_rhs) { this->~V(); new (this) V(_rhs); }
         return *this;
     }
@@ -118,8 +101,7 @@ vesk::ReflectedVariant const& _GetReflected(V const*);
 vesk::TypeOps const& _GetTypeOps(V const*);
 template<typename Archive> inline void Serialise(Archive& _ar,V const& _x) { _x.Serialise(_ar); }
 template<typename Archive> inline void Deserialise(Archive& _ar,V & _x) { _x.Deserialise(_ar); }
-struct V::h
-{
+struct V::h {
     enum { tag=5 };
     h() {}
     h(vesk::pref<vesk::IObject> const& p_) : p(p_) {}
@@ -131,16 +113,13 @@ struct V::h
     typedef h Value;
     vesk::pref<vesk::IObject> p;
 };
-inline V::V(h const& _x)
-{
+inline V::V(h const& _x) {
     _tag = 5;
     *(h**)_data = new h(_x);
 }
-inline V::V(V const& _rhs)
-{
+inline V::V(V const& _rhs) {
     _tag = _rhs._tag;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::int32(_rhs.as<vesk::int32 >()); break;
         case 1 : new (_data) x(_rhs.as<x >()); break;
         case 3 : *(ref**)_data = new ref(_rhs.as<ref >()); break;
@@ -148,21 +127,17 @@ inline V::V(V const& _rhs)
         case 5 : *(h**)_data = new h(_rhs.as<h >()); break;
     }
 }
-inline V::~V()
-{
-    switch(_tag)
-    {
+inline V::~V() {
+    switch(_tag) {
         case 1 : as<x >().vesk::string8::~basic_xstring(); break;
         case 3 : delete *(ref**)_data; break;
         case 4 : (*(s**)_data)->~s(); break;
         case 5 : delete *(h**)_data; break;
     }
 }
-inline bool V::operator==(V const& _rhs) const
-{
+inline bool V::operator==(V const& _rhs) const {
     if (_tag != _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::int32 >() == _rhs.as<vesk::int32 >();
         case 1 : return as<x >() == _rhs.as<x >();
         case 3 : return as<ref >() == _rhs.as<ref >();
@@ -171,12 +146,10 @@ inline bool V::operator==(V const& _rhs) const
     }
     return true;
 }
-inline bool V::operator<(V const& _rhs) const
-{
+inline bool V::operator<(V const& _rhs) const {
     if (_tag < _rhs._tag) return true;
     if (_tag > _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::int32 >() < _rhs.as<vesk::int32 >();
         case 1 : return as<x >() < _rhs.as<x >();
         case 3 : return as<ref >() < _rhs.as<ref >();
@@ -185,10 +158,8 @@ inline bool V::operator<(V const& _rhs) const
     }
     return false;
 }
-inline void V::Write(vesk::xostream& _os) const
-{
-    switch(_tag)
-    {
+inline void V::Write(vesk::xostream& _os) const {
+    switch(_tag) {
         case 0 : _os << as<vesk::int32 >(); break;
         case 1 : _os << "x(" << as<x >() << ')'; break;
         case 2 : _os << "none"; break;
@@ -198,27 +169,21 @@ inline void V::Write(vesk::xostream& _os) const
         default: vxAssert(0);
     }
 }
-inline void V::VisitObjects(vesk::IObjectVisitor& _v) const
-{
-    switch(_tag)
-    {
+inline void V::VisitObjects(vesk::IObjectVisitor& _v) const {
+    switch(_tag) {
         case 3 : _v << as<ref >(); break;
         case 5 : _v << as<h >(); break;
     }
 }
-inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const
-{
-    switch(_tag)
-    {
+inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const {
+    switch(_tag) {
         case 3 : _v << as<ref >(); break;
         case 5 : _v << as<h >(); break;
     }
 }
-template<typename Archive> inline void V::Serialise(Archive& _ar) const
-{
+template<typename Archive> inline void V::Serialise(Archive& _ar) const {
     vesk::SerialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : _ar << as<vesk::int32 >(); break;
         case 1 : _ar << as<x >(); break;
         case 3 : _ar << as<ref >(); break;
@@ -226,12 +191,10 @@ template<typename Archive> inline void V::Serialise(Archive& _ar) const
         case 5 : as<h >().Serialise(_ar); break;
     }
 }
-template<typename Archive> inline void V::Deserialise(Archive& _ar)
-{
+template<typename Archive> inline void V::Deserialise(Archive& _ar) {
     this->~V();
     vesk::DeserialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::int32(); _ar >> as<vesk::int32 >(); break;
         case 1 : new (_data) vesk::string8(); _ar >> as<x >(); break;
         case 3 : *(vesk::pref<vesk::IObject>**)_data = new vesk::pref<vesk::IObject>(); _ar >> as<ref >(); break;
@@ -240,17 +203,9 @@ template<typename Archive> inline void V::Deserialise(Archive& _ar)
     }
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<V>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_variant;
-    static const bool has_metadata = 1;
+namespace vesk {
+template<> struct TypeTraits<V> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_variant; static const bool has_metadata = 1;
 };
 } // namespace vesk
 
-
-#endif // include guard

@@ -1,32 +1,22 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-class V
-{
+class V {
     public:
     
     template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
-    V(vesk::xmap<vesk::int32,vesk::string8 > const& _rhs)
-    {
+    V(vesk::xmap<vesk::int32,vesk::string8 > const& _rhs) {
         _tag = 0;
         new (_data) vesk::xmap<vesk::int32,vesk::string8 >(_rhs);
     }
-    V(vesk::int32 const* const& _rhs)
-    {
+    V(vesk::int32 const* const& _rhs) {
         _tag = 1;
         new (_data) vesk::int32 const*(_rhs);
     }
-    V(vesk::ptr<vesk::ptr<vesk::IObject> >& const& _rhs)
-    {
+    V(vesk::ptr<vesk::ptr<vesk::IObject> >& const& _rhs) {
         _tag = 2;
         new (_data) vesk::ptr<vesk::ptr<vesk::IObject> >&(_rhs);
     }
     V(V const& _rhs);
     ~V();
-    V& operator=(V const& _rhs)
-    {
+    V& operator=(V const& _rhs) {
         if (this != &_rhs) { this->~V(); new (this) V(_rhs); }
         return *this;
     }
@@ -64,83 +54,61 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,V const& _x) { _x.V
 inline vesk::xostream& operator<<(vesk::xostream& _os,V const& _x) { _x.Write(_os); return _os; }
 vesk::ReflectedVariant const& _GetReflected(V const*);
 vesk::TypeOps const& _GetTypeOps(V const*);
-inline V::V(V const& _rhs)
-{
+inline V::V(V const& _rhs) {
     _tag = _rhs._tag;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::xmap<vesk::int32,vesk::string8 >(_rhs.as<vesk::xmap<vesk::int32,vesk::string8 > >()); break;
         case 1 : new (_data) vesk::int32 const*(_rhs.as<vesk::int32 const* >()); break;
         case 2 : new (_data) vesk::ptr<vesk::ptr<vesk::IObject> >&(_rhs.as<vesk::ptr<vesk::ptr<vesk::IObject> >& >()); break;
     }
 }
-inline V::~V()
-{
-    switch(_tag)
-    {
+inline V::~V() {
+    switch(_tag) {
         case 0 : as<vesk::xmap<vesk::int32,vesk::string8 > >().vesk::xmap<vesk::int32,vesk::string8 >::~xmap(); break;
     }
 }
-inline bool V::operator==(V const& _rhs) const
-{
+inline bool V::operator==(V const& _rhs) const {
     if (_tag != _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::xmap<vesk::int32,vesk::string8 > >() == _rhs.as<vesk::xmap<vesk::int32,vesk::string8 > >();
         case 1 : return as<vesk::int32 const* >() == _rhs.as<vesk::int32 const* >();
         case 2 : return as<vesk::ptr<vesk::ptr<vesk::IObject> >& >() == _rhs.as<vesk::ptr<vesk::ptr<vesk::IObject> >& >();
     }
     return true;
 }
-inline bool V::operator<(V const& _rhs) const
-{
+inline bool V::operator<(V const& _rhs) const {
     if (_tag < _rhs._tag) return true;
     if (_tag > _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::xmap<vesk::int32,vesk::string8 > >() < _rhs.as<vesk::xmap<vesk::int32,vesk::string8 > >();
         case 1 : return as<vesk::int32 const* >() < _rhs.as<vesk::int32 const* >();
         case 2 : return as<vesk::ptr<vesk::ptr<vesk::IObject> >& >() < _rhs.as<vesk::ptr<vesk::ptr<vesk::IObject> >& >();
     }
     return false;
 }
-inline void V::Write(vesk::xostream& _os) const
-{
-    switch(_tag)
-    {
+inline void V::Write(vesk::xostream& _os) const {
+    switch(_tag) {
         case 0 : _os << as<vesk::xmap<vesk::int32,vesk::string8 > >(); break;
         case 1 : _os << as<vesk::int32 const* >(); break;
         case 2 : _os << as<vesk::ptr<vesk::ptr<vesk::IObject> >& >(); break;
         default: vxAssert(0);
     }
 }
-inline void V::VisitObjects(vesk::IObjectVisitor& _v) const
-{
-    switch(_tag)
-    {
+inline void V::VisitObjects(vesk::IObjectVisitor& _v) const {
+    switch(_tag) {
         case 0 : _v << as<vesk::xmap<vesk::int32,vesk::string8 > >(); break;
         case 1 : _v << as<vesk::int32 const* >(); break;
         case 2 : _v << as<vesk::ptr<vesk::ptr<vesk::IObject> >& >(); break;
     }
 }
-inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const
-{
-    switch(_tag)
-    {
+inline void V::VisitPrefs(vesk::IPrefVisitor& _v) const {
+    switch(_tag) {
         case 0 : _v << as<vesk::xmap<vesk::int32,vesk::string8 > >(); break;
     }
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<V>
-{
-    static const bool is_exported = 1;
-    static const bool is_reflected = 1;
-    static const bool is_registered = 1;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_variant;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<V> {
+    static const bool is_exported = 1; static const bool is_reflected = 1; static const bool is_registered = 1; static const vesk::ETypeTraitKind kind = vesk::TTK_variant; static const bool has_metadata = 0;
 };
 } // namespace vesk
-
-#endif // include guard

@@ -1,31 +1,21 @@
-#pragma once
-#ifndef _app_src_t_h
-#define _app_src_t_h
-
-#include "Vesk/vxObject/IObject.h"
-class A
-{
+class A {
     public:
     
-    struct n
-    {
+    struct n {
         enum { tag=1 };
         typedef void Value;
     };
     template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
-    A(vesk::int32 const& _rhs)
-    {
+    A(vesk::int32 const& _rhs) {
         _tag = 0;
         new (_data) vesk::int32(_rhs);
     }
-    A(n const& _rhs)
-    {
+    A(n const& _rhs) {
         _tag = 1;
     }
     A(A const& _rhs);
     ~A();
-    A& operator=(A const& _rhs)
-    {
+    A& operator=(A const& _rhs) {
         if (this != &_rhs) { this->~A(); new (this) A(_rhs); }
         return *this;
     }
@@ -58,93 +48,69 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,A const& _x) { _x.V
 inline vesk::xostream& operator<<(vesk::xostream& _os,A const& _x) { _x.Write(_os); return _os; }
 template<typename Archive> inline void Serialise(Archive& _ar,A const& _x) { _x.Serialise(_ar); }
 template<typename Archive> inline void Deserialise(Archive& _ar,A & _x) { _x.Deserialise(_ar); }
-inline A::A(A const& _rhs)
-{
+inline A::A(A const& _rhs) {
     _tag = _rhs._tag;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::int32(_rhs.as<vesk::int32 >()); break;
     }
 }
-inline A::~A()
-{
+inline A::~A() {
 }
-inline bool A::operator==(A const& _rhs) const
-{
+inline bool A::operator==(A const& _rhs) const {
     if (_tag != _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::int32 >() == _rhs.as<vesk::int32 >();
     }
     return true;
 }
-inline bool A::operator<(A const& _rhs) const
-{
+inline bool A::operator<(A const& _rhs) const {
     if (_tag < _rhs._tag) return true;
     if (_tag > _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<vesk::int32 >() < _rhs.as<vesk::int32 >();
     }
     return false;
 }
-inline void A::Write(vesk::xostream& _os) const
-{
-    switch(_tag)
-    {
+inline void A::Write(vesk::xostream& _os) const {
+    switch(_tag) {
         case 0 : _os << as<vesk::int32 >(); break;
         case 1 : _os << "n"; break;
         default: vxAssert(0);
     }
 }
-inline void A::VisitObjects(vesk::IObjectVisitor& _v) const
-{
+inline void A::VisitObjects(vesk::IObjectVisitor& _v) const {
 }
-inline void A::VisitPrefs(vesk::IPrefVisitor& _v) const
-{
+inline void A::VisitPrefs(vesk::IPrefVisitor& _v) const {
 }
-template<typename Archive> inline void A::Serialise(Archive& _ar) const
-{
+template<typename Archive> inline void A::Serialise(Archive& _ar) const {
     vesk::SerialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : _ar << as<vesk::int32 >(); break;
     }
 }
-template<typename Archive> inline void A::Deserialise(Archive& _ar)
-{
+template<typename Archive> inline void A::Deserialise(Archive& _ar) {
     vesk::DeserialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::int32(); _ar >> as<vesk::int32 >(); break;
     }
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<A>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_variant;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<A> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_variant; static const bool has_metadata = 0;
 };
 } // namespace vesk
 
-class B
-{
+class B {
     public:
     
-    struct x
-    {
+    struct x {
         enum { tag=0 };
         typedef vesk::string8 Value;
         x(const Value& _v) : value(_v) {}
         Value value;
     };
-    struct s
-    {
+    struct s {
         enum { tag=1 };
         s() {}
         s(bool const& f_) : f(f_) {}
@@ -157,20 +123,17 @@ class B
         bool f;
     };
     template<typename T> struct _mapvalue_ { enum { tag=T::tag }; typedef typename T::Value Value; };
-    B(x const& _rhs)
-    {
+    B(x const& _rhs) {
         _tag = 0;
         new (_data) x(_rhs);
     }
-    B(s const& _rhs)
-    {
+    B(s const& _rhs) {
         _tag = 1;
         new (_data) s(_rhs);
     }
     B(B const& _rhs);
     ~B();
-    B& operator=(B const& _rhs)
-    {
+    B& operator=(B const& _rhs) {
         if (this != &_rhs) { this->~B(); new (this) B(_rhs); }
         return *this;
     }
@@ -200,105 +163,79 @@ inline vesk::IPrefVisitor& operator<<(vesk::IPrefVisitor& _v,B const& _x) { _x.V
 inline vesk::xostream& operator<<(vesk::xostream& _os,B const& _x) { _x.Write(_os); return _os; }
 template<typename Archive> inline void Serialise(Archive& _ar,B const& _x) { _x.Serialise(_ar); }
 template<typename Archive> inline void Deserialise(Archive& _ar,B & _x) { _x.Deserialise(_ar); }
-inline B::B(B const& _rhs)
-{
+inline B::B(B const& _rhs) {
     _tag = _rhs._tag;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) x(_rhs.as<x >()); break;
         case 1 : new (_data) s(_rhs.as<s >()); break;
     }
 }
-inline B::~B()
-{
-    switch(_tag)
-    {
+inline B::~B() {
+    switch(_tag) {
         case 0 : as<x >().vesk::string8::~basic_xstring(); break;
         case 1 : (*(s**)_data)->~s(); break;
     }
 }
-inline bool B::operator==(B const& _rhs) const
-{
+inline bool B::operator==(B const& _rhs) const {
     if (_tag != _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<x >() == _rhs.as<x >();
         case 1 : return as<s >() == _rhs.as<s >();
     }
     return true;
 }
-inline bool B::operator<(B const& _rhs) const
-{
+inline bool B::operator<(B const& _rhs) const {
     if (_tag < _rhs._tag) return true;
     if (_tag > _rhs._tag) return false;
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : return as<x >() < _rhs.as<x >();
         case 1 : return as<s >() < _rhs.as<s >();
     }
     return false;
 }
-inline void B::Write(vesk::xostream& _os) const
-{
-    switch(_tag)
-    {
+inline void B::Write(vesk::xostream& _os) const {
+    switch(_tag) {
         case 0 : _os << "x(" << as<x >() << ')'; break;
         case 1 : as<s >().Write(_os); break;
         default: vxAssert(0);
     }
 }
-inline void B::VisitObjects(vesk::IObjectVisitor& _v) const
-{
+inline void B::VisitObjects(vesk::IObjectVisitor& _v) const {
 }
-inline void B::VisitPrefs(vesk::IPrefVisitor& _v) const
-{
+inline void B::VisitPrefs(vesk::IPrefVisitor& _v) const {
 }
-template<typename Archive> inline void B::Serialise(Archive& _ar) const
-{
+template<typename Archive> inline void B::Serialise(Archive& _ar) const {
     vesk::SerialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : _ar << as<x >(); break;
         case 1 : as<s >().Serialise(_ar); break;
     }
 }
-template<typename Archive> inline void B::Deserialise(Archive& _ar)
-{
+template<typename Archive> inline void B::Deserialise(Archive& _ar) {
     this->~B();
     vesk::DeserialiseVariableLengthUint(_ar,_tag);
-    switch(_tag)
-    {
+    switch(_tag) {
         case 0 : new (_data) vesk::string8(); _ar >> as<x >(); break;
         case 1 : new (_data) s(); as<s >().Deserialise(_ar); break;
     }
 }
 
-namespace vesk
-{
-template<> struct TypeTraits<B>
-{
-    static const bool is_exported = 0;
-    static const bool is_reflected = 0;
-    static const bool is_registered = 0;
-    static const vesk::ETypeTraitKind kind = vesk::TTK_variant;
-    static const bool has_metadata = 0;
+namespace vesk {
+template<> struct TypeTraits<B> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_variant; static const bool has_metadata = 0;
 };
 } // namespace vesk
 
-vesk::int32 f(A a,bool flag=true,B const& b)
-{
-        switch(a.GetTag())
-        {
+vesk::int32 f(A a,bool flag=true,B const& b) {
+        switch(a.GetTag()) {
         case 0 :
-            switch(b.GetTag())
-            {
+            switch(b.GetTag()) {
             case 0 : return f(a.as<vesk::int32>(),flag,b.as<x>());
             case 1 : return f(a.as<vesk::int32>(),flag,b.as<s>());
             default: vxAssertUnreachable();
             }
         case 1 :
-            switch(b.GetTag())
-            {
+            switch(b.GetTag()) {
             case 0 : return f(a.as<n>(),flag,b.as<x>());
             case 1 : return f(a.as<n>(),flag,b.as<s>());
             default: vxAssertUnreachable();
@@ -307,15 +244,11 @@ vesk::int32 f(A a,bool flag=true,B const& b)
         }
 }
 
-inline void g(A& a)
-{
-        switch(a.GetTag())
-        {
+inline void g(A& a) {
+        switch(a.GetTag()) {
         case 0 : g(a.as<vesk::int32>()); break;
         case 1 : g(a.as<n>()); break;
         default: vxAssertUnreachable();
         }
 }
 
-
-#endif // include guard

@@ -55,7 +55,8 @@ void CalculationStack::Unmap() {}
 bool CalculationStack::Open() {
   if (m_isInUse) return false;
   for (std::size_t size = Most; !m_memory && size >= Least; size /= 2) {
-    void* memory = mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
+    void* memory =
+        mmap(nullptr, size, PROT_READ | PROT_WRITE, MAP_PRIVATE | MAP_ANONYMOUS | MAP_NORESERVE | MAP_STACK, -1, 0);
     if (memory == MAP_FAILED) continue;
     m_memory = memory;
     m_size = size;
@@ -64,9 +65,7 @@ bool CalculationStack::Open() {
   return m_memory != nullptr;
 }
 
-void CalculationStack::Unmap() {
-  munmap(std::exchange(m_memory, nullptr), m_size);
-}
+void CalculationStack::Unmap() { munmap(std::exchange(m_memory, nullptr), m_size); }
 
 struct CalculationStack::Switch {
   // To the other stack and, once the action is done, back from it.

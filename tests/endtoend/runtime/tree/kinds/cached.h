@@ -4,11 +4,9 @@
 
 $warning(disable: 1009)
 
-namespace kinds
-{
+namespace kinds {
 
-$mixin CacheMixin
-{
+$mixin CacheMixin {
     $indep int32 source;
     $cache int32 tens() const { ++calculated; return source / 10; }
     $cache ^ <<queue(2)>> void filled(vesk::xvector<int32>& out) const { out.assign(3, source); }
@@ -25,15 +23,13 @@ $mixin CacheMixin
     $cache <<async>> void laterPlain(int32& out, int32 k, int32 m) const { out = k * m; }
     mutable int32 calculated = 0;
 };
-$class+ WithCaches isa shapes::INamed : mixin [ CacheMixin ]
-{
+$class+ WithCaches isa shapes::INamed : mixin [ CacheMixin ] {
 public:
     vesk::string8 Name() const { return "caches"; }
     $int32 base;
 };
 
-$struct CacheTemplate<typename T>
-{
+$struct CacheTemplate<typename T> {
     $indep T source;
     $cache T tens() const { ++calculated; return source / 10; }
     $cache ^ <<queue(2)>> void filled(vesk::xvector<T>& out) const { out.assign(3, source); }

@@ -4,8 +4,7 @@
 
 $warning(disable: 1009)
 
-namespace kinds
-{
+namespace kinds {
 
 $class+ Cell isa shapes::INamed : model { int32 input; string8 text; int32 items[]; }
 {
@@ -58,23 +57,20 @@ public:
     vesk::ptr<shapes::INamed> seen;
 };
 
-$struct Nodes
-{
+$struct Nodes {
     $indep int32 a;
     $dep int32 b = { b = a + 1; };
     $cache int32 c() const { return b + 1; }
     $evict { }
 };
 
-$mixin NodeMixin
-{
+$mixin NodeMixin {
     $indep int32 base;
     $dep int32 derived = { derived = base + 1; };
     $dep void action calc { };
     typename BC::FinalClass const* Final() const { return $this; }
 };
-$class+ WithNodes isa shapes::INamed : mixin [ NodeMixin { $dep int32 more = { more = 4; }; } ]
-{
+$class+ WithNodes isa shapes::INamed : mixin [ NodeMixin { $dep int32 more = { more = 4; }; } ] {
 public:
     vesk::string8 Name() const { return "nodes"; }
 };

@@ -4,11 +4,9 @@
 
 $warning(disable: 1009)
 
-namespace kinds
-{
+namespace kinds {
 
-$variant+ Value : [ "v" ]
-{
+$variant+ Value : [ "v" ] {
     default 7;
     int32;
     string8 : [ "text" ];
@@ -46,31 +44,26 @@ $polymorphic inline void Show([Small a]);
 $function int Local(int n);
 $function+ inline int32 Thrice(int32 n) { return 3 * n; }
 
-$adt+ Stack : [ "adt" ]
-{
+$adt+ Stack : [ "adt" ] {
     int32 Depth() const;
     void Push(int32 n);
     void Drop();
 };
 $function+ Stack* MakeStack();
 
-$mixin Counter
-{
+$mixin Counter {
     $int32 counter;
     void Count() { ++counter; }
     typename BC::FinalClass* Me() { return $this; }
 };
-$mixin Args<typename T>
-{
+$mixin Args<typename T> {
     T value;
 };
 $mixin WithModel : model { int32 inmixin; } { };
 $mixin WithBase : shapes::Point { };
-struct Foreign
-{
+struct Foreign {
     template <typename BC>
-    struct M : public BC
-    {
+    struct M : public BC {
         int foreign = 8;
     };
 };
@@ -83,8 +76,7 @@ $class+ Mixed isa shapes::INamed : mixin
     { $int32 anonymous; void Both(int v) { anonymous = v; $this->Count(); } }
     model { int32 inlist; string8 text; }
     ? Foreign::M
-]
-{
+] {
 public:
     $implementing shapes::INamed { Name };
     $class Nested { $int32 a; };
@@ -96,13 +88,11 @@ public:
     int32 Sum() { return $$::Static() + own; }
     static int32 Static() { return 40; }
 };
-$class+ ListsModel isa shapes::INamed : mixin [ Size ]
-{
+$class+ ListsModel isa shapes::INamed : mixin [ Size ] {
 public:
     vesk::string8 Name() const { return "model in a list"; }
 };
-$class+ ListsMixin isa shapes::INamed : mixin [ WithModel ]
-{
+$class+ ListsMixin isa shapes::INamed : mixin [ WithModel ] {
 public:
     vesk::string8 Name() const { return "mixin with a model"; }
 };
@@ -111,36 +101,30 @@ $struct RawAndModel : shapes::Point model { int32 q; } { };
 $class+ Delegates isa shapes::INamed : mixin
 [
     { vesk::ptr<shapes::INamed> m_named; vesk::ptr<shapes::INamed> Get() const { return m_named; } }
-]
-{
+] {
 public:
     vesk::string8 Name() const { return Get()->Name(); }
 };
 
 $struct Deferred isa shapes::INamed;
-$struct Deferred isa shapes::INamed
-{
+$struct Deferred isa shapes::INamed {
     vesk::string8 Name() const { return "deferred"; }
 };
-$class+ Final final isa shapes::INamed
-{
+$class+ Final final isa shapes::INamed {
 public:
     vesk::string8 Name() const { return "final"; }
 };
-$class+ Abstract <<abstract>> isa shapes::INamed
-{
+$class+ Abstract <<abstract>> isa shapes::INamed {
 public:
     vesk::string8 Name() const { return "abstract"; }
 };
 $struct Template<typename T> { T t; };
-$struct TemplateObject<typename T> isa shapes::INamed
-{
+$struct TemplateObject<typename T> isa shapes::INamed {
     T t;
     vesk::string8 Name() const { return "template"; }
 };
 $struct TemplateModel<typename T> <<-os>> : model { int32* a; } { };
-struct External
-{
+struct External {
     int32 a;
 };
 $struct External <<extern copy reflect>> { };

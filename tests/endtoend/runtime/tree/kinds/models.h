@@ -5,28 +5,24 @@
 
 $warning(disable: 1009)
 
-namespace kinds
-{
+namespace kinds {
 
 $interface+ IDoc : vesk::IPersistable { };
 
-$model+ Size : [ "size" ]
-{
+$model+ Size : [ "size" ] {
     int32 width;
     offsettable<int32> height;
     shapes::Colour colour;
     shapes::Level level;
     $$(int32 square) : width(square), height(square), colour(shapes::Red), level(shapes::Level::Mid) {}
     $schema { 1: + width + height  2: + colour  3: + level }
-    $evolve
-    {
+    $evolve {
         colour (width) { colour = width > 10 ? shapes::Green : shapes::Red; }
         level { level = shapes::Level::High; }
     }
 };
 
-$model+ Everything
-{
+$model+ Everything {
     bool flag;
     int8 i8; int16 i16; int64 i64; int128 i128;
     uint8 u8; uint16 u16; uint32 u32; uint64 u64;
@@ -61,8 +57,7 @@ $model Pointers { int32* p; vesk::ptr<IDoc> doc; Size size; None* none; };
 $model Characters { char8 c8; char16 c16; uint128 u128; };
 
 // With operations: an IObject with a model.
-$class+ Doc isa IDoc : model
-{
+$class+ Doc isa IDoc : model {
     assignable<string8> title;
     int32 count;
     xvector<int32> lines;
@@ -81,16 +76,13 @@ $class+ Doc isa IDoc : model
     offsettable<uint32> total;
     int32 dynamic[];
     $dropped { int32 pages; }
-    $schema
-    {
+    $schema {
         1: + title + pages + count
         2: - pages + lines + marks + wide + grid + notes + bytes + sizes + tags + docs + fixedDocs + list + size + next
         3: + total + dynamic
     }
-    $evolve
-    {
-        lines (pages)
-        {
+    $evolve {
+        lines (pages) {
             if (pages < 0 || pages > 1000) throw vesk::ArchiveError("number of pages");
             lines = vesk::xvector<int32>(pages);
         }
@@ -103,8 +95,7 @@ $class+ Doc isa IDoc : model
 // What the first release wrote for a Doc.
 $struct Doc1 : model { assignable<string8> title; int32 pages; int32 count; } { };
 
-$struct+ NoOps <<-genop>> isa vesk::IObject : model
-{
+$struct+ NoOps <<-genop>> isa vesk::IObject : model {
     int32 a;
     int32 fixed[3];
     string8 text;
@@ -116,8 +107,7 @@ $struct+ NoOps <<-genop>> isa vesk::IObject : model
 {
 };
 $struct Plain : model { int32 a; float64 b; } { };
-$class+ Sized isa IDoc : model Size
-{
+$class+ Sized isa IDoc : model Size {
 public:
     $int32 Area() const { return width * height; }
 };

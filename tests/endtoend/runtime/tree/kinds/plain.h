@@ -4,19 +4,16 @@
 
 $warning(disable: 1009)
 
-namespace kinds
-{
+namespace kinds {
 
-$struct+ Part <<compare>>
-{
+$struct+ Part <<compare>> {
     $int32 number;
     $string8 name;
     $xvector<int8> marks;
     bool operator==(Part const& rhs) const { return number == rhs.number && name == rhs.name && marks == rhs.marks; }
     bool operator<(Part const& rhs) const { return number < rhs.number; }
 };
-$struct+ Wide <<compare>>
-{
+$struct+ Wide <<compare>> {
     Wide(int32 n = 0) : big(n), small(0) {}
     $int128 big;
     $int8 small;
@@ -24,13 +21,11 @@ $struct+ Wide <<compare>>
     bool operator==(Wide const& rhs) const { return big == rhs.big; }
 };
 
-$class+ Reflected isa vesk::IObject
-{
+$class+ Reflected isa vesk::IObject {
 public:
     Reflected()
         : flag(false), i8(0), i16(0), i64(0), i128(0), u64(0), u128(0), f32(0), f64(0), c8('a'), c16(u'b'),
-          colour(shapes::Red)
-    {
+          colour(shapes::Red) {
     }
     $bool flag;
     $int8 i8;
@@ -78,8 +73,7 @@ public:
     $void Rename(vesk::string8 const& name) { s8 = name; }
 };
 
-$class+ Sources isa vesk::IObject
-{
+$class+ Sources isa vesk::IObject {
 public:
     $indep int8 tiny;
     $indep int32 number;

@@ -3,11 +3,9 @@
 
 $warning(disable: 1009)
 
-namespace kinds
-{
+namespace kinds {
 
-$interface+ rmi ICalc : vesk::IObject
-{
+$interface+ rmi ICalc : vesk::IObject {
     void Add([in] int32 a, [in] const string8& b, [out] int32& sum);
     void Swap([inout] string8& a, [inout] int32& b) const;
     void Notify([in] int32 n);
@@ -18,8 +16,7 @@ $interface+ rmi ICalc : vesk::IObject
 $interface rmi IPlain { void Ping(); };
 $interface ipc IEmptyIpc { };
 // An object that archives could hold.
-$interface+ rmi IKept : vesk::IPersistable
-{
+$interface+ rmi IKept : vesk::IPersistable {
     void Put([in] int32 n);
     void Take([in] int32 more, [out] int32& n) const;
 };
@@ -30,12 +27,10 @@ public:
     void Take(int32 more, int32& n) const { n = number + more; }
 };
 
-$class+ Calc isa ICalc
-{
+$class+ Calc isa ICalc {
 public:
     void Add(int32 a, const vesk::string8& b, int32& sum) { sum = Sum(a, int32(b.size())); }
-    void Swap(vesk::string8& a, int32& b) const
-    {
+    void Swap(vesk::string8& a, int32& b) const {
         if (onSwap) onSwap(a);
         a += "!";
         b = Sum(~b, 1);

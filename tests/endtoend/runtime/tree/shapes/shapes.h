@@ -2,21 +2,18 @@
 // interfaces, a function.
 @import "Vesk/vxObject/IObject.h"
 
-namespace shapes
-{
+namespace shapes {
 
 $enum+ Colour : [ "colours" ] { Red, Green = 5, -Blue };
 $enum+ class Level { Low, default Mid, High };
 $enum+ class Refined { A, default B, C = 7, -D };
 $enum+ Empty { };
 
-$interface+ INamed : vesk::IObject
-{
+$interface+ INamed : vesk::IObject {
     string8 Name() const;
 };
 
-$interface+ IShape : [ "a shape" ] : vesk::IObject
-{
+$interface+ IShape : [ "a shape" ] : vesk::IObject {
     float64 Area() const;
     void Scale(float64 by : [ "factor" ]) : [ 1 ];
     int32 size;
@@ -26,14 +23,12 @@ $interface+ IShape : [ "a shape" ] : vesk::IObject
 };
 
 // Both, IObject by two ways.
-$interface+ INamedShape : IShape, INamed
-{
+$interface+ INamedShape : IShape, INamed {
     float64 : [ "unit" ] Ratio() const;
 };
 $interface+ INothing { };
 
-$struct+ Point : [ note("a point"), [ 1, 2.5, true ], plain ]
-{
+$struct+ Point : [ note("a point"), [ 1, 2.5, true ], plain ] {
     $int32 x;
     $int32 : [ "unit", 7 ] y;
     $int32 Sum(int32 more = 1) const { return x + y + more; }
@@ -43,14 +38,12 @@ $struct+ Point : [ note("a point"), [ 1, 2.5, true ], plain ]
     friend vesk::xostream& operator<<(vesk::xostream& os, Point const& p) { return os << p.x << '/' << p.y; }
 };
 
-$class+ Square : [ "class" ]
-{
+$class+ Square : [ "class" ] {
 public:
     $float64 side;
 };
 $class Forward;
-$class+ Box isa INamedShape
-{
+$class+ Box isa INamedShape {
 public:
     Box() : side(1) {}
     vesk::string8 Name() const;

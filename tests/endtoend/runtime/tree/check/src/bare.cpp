@@ -1,17 +1,15 @@
 // Containers offer what their items offer; signatures need no name space.
-@import "check.h"
+@import "rows/rows.h"
 @import "Vesk/vxObject/Access.h"
 @import "kinds/bare.h"
 
 using namespace kinds;
 
-namespace
-{
+namespace {
 
 // What the registered type makes of a value and its copy: equal, less, text, and what comes back of an archive.
 template <typename T>
-vesk::xstring OffersOf(T const& value)
-{
+vesk::xstring OffersOf(T const& value) {
     alignas(T) char memory[sizeof(T)];
     T& copy = *reinterpret_cast<T*>(memory);
     vesk::TypeOps const& ops = vesk::GetTypeOps<T>();
@@ -19,17 +17,14 @@ vesk::xstring OffersOf(T const& value)
     const vesk::xstring offers = vesk::TextOf([&](vesk::xostream& os) {
         os << (ops.m_equal(&value, &copy) ? "equal " : "") << (ops.m_less(&copy, &copy) ? "less " : "");
         ops.m_print(os, &value);
-        try
-        {
+        try {
             vesk::Archive ar;
             ops.m_serialise(ar, &value, 0, 1);
             vesk::InputArchive input(ar);
             T read;
             ops.m_deserialise(input, &read, 0, 1);
             os << ' ' << read.size();
-        }
-        catch (vesk::ArchiveError const& error)
-        {
+        } catch (vesk::ArchiveError const& error) {
             os << ' ' << error.what();
         }
     });
@@ -39,8 +34,7 @@ vesk::xstring OffersOf(T const& value)
 
 }
 
-void CheckBareTypes()
-{
+ROW(BareTypes) {
     const Bare bare = {};
     typedef vesk::xvector<Bare> Bares;
     CHECK(OffersOf(Bares{bare, bare}), "? type cannot be archived");
@@ -70,8 +64,7 @@ void CheckBareTypes()
     CHECK(Throws([&] { vesk::GetTypeOps<vesk::xset<Archived>>().m_deserialise(input, &set, 0, 1); }), true);
 }
 
-void CheckSignatures()
-{
+ROW(Signatures) {
     Signatures object;
     typedef vesk::string8 Join(vesk::xvector<vesk::string8> const&, vesk::xlist<vesk::xstring> const&,
                                vesk::xdeque<vesk::string16> const&);

@@ -1,15 +1,13 @@
 // Cached functions where what their nodes inherit depends on template parameters.
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/cached.h"
 
 using namespace kinds;
 
-namespace
-{
+namespace {
 
 template <typename Object>
-void CheckCachesOf(Object& object, vesk::xstring const& name)
-{
+void CheckCachesOf(Object& object, vesk::xstring const& name) {
     auto readAsync = [&] {
         return vxMakeString(object.later() << ',' << object.laterInto() << ',' << object.laterKeyed(3) << ','
                                            << object.laterPlain(3, 4));
@@ -41,10 +39,8 @@ void CheckCachesOf(Object& object, vesk::xstring const& name)
 }
 
 // Whose final object it is.
-struct Seen : vesk::IObjectVisitor
-{
-    void VisitObject(vesk::ptr<vesk::IObject> const& object) override
-    {
+struct Seen : vesk::IObjectVisitor {
+    void VisitObject(vesk::ptr<vesk::IObject> const& object) override {
         names.push_back(object->GetReflectedClass()->m_name);
     }
     vesk::xvector<vesk::xstring> names;
@@ -52,8 +48,7 @@ struct Seen : vesk::IObjectVisitor
 
 }
 
-void CheckCachesInTemplates()
-{
+ROW(CachesInTemplates) {
     WithCaches mixed;
     CheckCachesOf(mixed, "CacheMixin");
     Seen seen;

@@ -1,9 +1,8 @@
 // What a change of an input, an eviction, an error or a write does to what depends on it.
-@import "check.h"
+@import "rows/rows.h"
 @import "check/src/nodes.h"
 
-void CheckEvictions()
-{
+ROW(Evictions) {
     Sums s;
     s.x = 5;
     CHECK(s.b.read(), 105);
@@ -38,8 +37,7 @@ void CheckEvictions()
     CHECK(vxMakeString(s.b.Inputs().size() << s.b.Dependents().size() << s.a.Dependents().size()), "101");
 }
 
-void CheckWritesInside()
-{
+ROW(WritesInside) {
     Writes w;
     w.x = 5;
     CHECK(w.behind.read(), 50);
@@ -64,8 +62,7 @@ void CheckWritesInside()
     CHECK(w.calculated, 2);
 }
 
-void CheckErrorsInside()
-{
+ROW(ErrorsInside) {
     Breaks b;
     b.x = 3;
     CHECK(b.careful.read(), 4);
@@ -82,8 +79,7 @@ void CheckErrorsInside()
     CHECK(b.calculated, 1);
 }
 
-void CheckFields()
-{
+ROW(Fields) {
     Field field, otherField;
     Plain plain;
     Around around;
@@ -106,8 +102,7 @@ void CheckFields()
         change();
         vesk::xstring bits;
         for (bool isUpToDate : {w.ofField.IsUpToDate(), w.ofMap.IsUpToDate(), w.ofElement.IsUpToDate(),
-                                w.ofAround.IsUpToDate(), w.ofWords.IsUpToDate()})
-        {
+                                w.ofAround.IsUpToDate(), w.ofWords.IsUpToDate()}) {
             bits += isUpToDate ? '0' : '1';
         }
         return bits;

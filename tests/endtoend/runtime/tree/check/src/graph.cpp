@@ -1,10 +1,9 @@
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/graph.h"
 
 using namespace kinds;
 
-void CheckGraph()
-{
+ROW(Graph) {
     Cell c;
     c.source = 42;
     CHECK(c.twice.read(), 84);
@@ -51,8 +50,7 @@ void CheckGraph()
     CHECK(vxMakeString(copy.area.read() << w.area.read()), "1312");
 }
 
-void CheckCaches()
-{
+ROW(Caches) {
     Cell c;
     c.source = 10;
     CHECK(vxMakeString(c.plus(1) << ',' << c.plus(2) << ',' << c.plus(1) << ',' << c.calculated), "11,12,11,2");
@@ -96,15 +94,12 @@ void CheckCaches()
     CHECK(vxMakeString(with.derived << with.more << (with.Final() == &with)), "54true");
 }
 
-void CheckVisiting()
-{
-    struct Collector : vesk::IObjectVisitor
-    {
+ROW(Visiting) {
+    struct Collector : vesk::IObjectVisitor {
         void VisitObject(vesk::ptr<vesk::IObject> const& object) override { objects.push_back(object); }
         vesk::xvector<vesk::ptr<vesk::IObject>> objects;
     };
-    struct Prefs : vesk::IPrefVisitor
-    {
+    struct Prefs : vesk::IPrefVisitor {
         void VisitPref(vesk::PersistentReference const&) override { ++count; }
         int count = 0;
     };

@@ -1,41 +1,34 @@
 // Archives that nobody wrote: they are refused with an ArchiveError, and leave values that can be used and destroyed.
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/models.h"
 @import "kinds/kinds.h"
 
 using namespace kinds;
 
-namespace
-{
+namespace {
 
 typedef vesk::xvector<vesk::octet_t> Bytes;
 
 template <typename... T>
-Bytes Written(T const&... values)
-{
+Bytes Written(T const&... values) {
     vesk::Archive ar;
     (ar << ... << values);
     return ar.m_bytes;
 }
 
 template <typename T>
-bool Refuses(Bytes bytes, T& value, vesk::ArchiveLimits const& limits = {})
-{
-    try
-    {
+bool Refuses(Bytes bytes, T& value, vesk::ArchiveLimits const& limits = {}) {
+    try {
         vesk::InputArchive input(std::move(bytes), limits);
         input >> value;
-    }
-    catch (vesk::ArchiveError const&)
-    {
+    } catch (vesk::ArchiveError const&) {
         return true;
     }
     return false;
 }
 
 template <typename T>
-bool Refuses(Bytes bytes)
-{
+bool Refuses(Bytes bytes) {
     T value = T();
     return Refuses(std::move(bytes), value);
 }
@@ -43,14 +36,12 @@ bool Refuses(Bytes bytes)
 // What asks for more elements than there are bytes, by billions.
 const Bytes g_billions = {0xF0, 0xFF, 0xFF, 0xFF, 0xFF};
 
-struct Words
-{
+struct Words {
     void Serialise(vesk::Archive& ar) const { ar << pointer << length; }
     void Deserialise(vesk::InputArchive& ar) { ar >> pointer >> length; }
     vesk::uint64 pointer = 0x1000, length = 16, more[2] = {};
 };
-struct OfTwo
-{
+struct OfTwo {
     template <typename A>
     void Serialise(A& ar) const { ar << first << second; }
     void Deserialise(vesk::InputArchive& ar) { ar >> first >> second; }
@@ -60,8 +51,7 @@ struct OfTwo
 
 }
 
-void CheckHostileReferences()
-{
+ROW(HostileReferences) {
     Words words;
     vesk::Archive ar;
     ar << vesk::cref<Words>(&words);
@@ -105,16 +95,14 @@ void CheckHostileReferences()
     delete held.Get();
 }
 
-void CheckHostileTypes()
-{
+ROW(HostileTypes) {
     // Any name with any bytes behind it is either read or refused.
     vesk::xvector<vesk::xstring> names = {"", "int32", "bool", "no::such", "kinds::IDoc", "shapes::Colour"};
     for (vesk::ReflectedClass const* record : vesk::All<vesk::ReflectedClass>()) names.push_back(record->m_name);
     for (vesk::ReflectedVariant const* record : vesk::All<vesk::ReflectedVariant>()) names.push_back(record->m_name);
     for (auto const& [name, ops] : vesk::TypeOpsTable()) names.push_back(name);
     int held = 0;
-    for (vesk::xstring const& name : names)
-    {
+    for (vesk::xstring const& name : names) {
         Bytes bytes = Written(name);
         bytes.insert(bytes.end(), 64, 0);
         vesk::openvariant<int32> any = vesk::string8("before");
@@ -142,11 +130,9 @@ void CheckHostileTypes()
 }
 
 template <typename V>
-void TryVariant(V const& written)
-{
+void TryVariant(V const& written) {
     const Bytes bytes = Written(written);
-    for (std::size_t size = 0; size < bytes.size(); ++size)
-    {
+    for (std::size_t size = 0; size < bytes.size(); ++size) {
         V read = vesk::string8("a text that is long enough to stand on the heap");
         CHECK(Refuses(Bytes(bytes.begin(), bytes.begin() + size), read), true);
         if (size == 0) CHECK(read.template is<vesk::string8>(), true);
@@ -154,8 +140,7 @@ void TryVariant(V const& written)
         read = written;
         CHECK(read == written, true);
     }
-    for (vesk::uint32 tag : {11u, 127u, 70000u, 0xFFFFFFFFu})
-    {
+    for (vesk::uint32 tag : {11u, 127u, 70000u, 0xFFFFFFFFu}) {
         vesk::Archive ar;
         vesk::SerialiseVariableLengthUint(ar, tag);
         V read = vesk::string8("text");
@@ -164,8 +149,7 @@ void TryVariant(V const& written)
     }
 }
 
-void CheckHostileVariants()
-{
+ROW(HostileVariants) {
     TryVariant<Value>(int32(7));
     TryVariant<Value>(vesk::string8("some text"));
     TryVariant<Value>(Value::point(1, 2));
@@ -195,8 +179,7 @@ void CheckHostileVariants()
     const Tree copy = tree;
     CHECK(copy == tree && !(copy < tree), true);
     Bytes keys = {2};
-    for (int leaf : {0, 2})
-    {
+    for (int leaf : {0, 2}) {
         keys.insert(keys.end(), deep.begin(), deep.end() - 1);
         keys.push_back(vesk::octet_t(leaf));
         if (leaf == 2) keys.insert(keys.end(), 4, 0);
@@ -206,8 +189,7 @@ void CheckHostileVariants()
     CHECK(set.size(), 2);
 }
 
-void CheckHostileNumbers()
-{
+ROW(HostileNumbers) {
     CHECK(Refuses<bool>({2}), true);
     CHECK(Refuses<bool>({1}), false);
     CHECK(Refuses<vesk::xvector<bool>>({2, 1, 255}), true);
@@ -226,8 +208,7 @@ void CheckHostileNumbers()
     CHECK(vxMakeString(colour << level), "33");
 }
 
-void CheckHostileSizes()
-{
+ROW(HostileSizes) {
     CHECK(Refuses<vesk::string8>(g_billions), true);
     CHECK(Refuses<vesk::string16>({2, 0, 0, 0}), true);
     CHECK(Refuses<vesk::xvector<None>>(g_billions), true);
@@ -248,16 +229,14 @@ void CheckHostileSizes()
     all.any = vesk::string8("any");
     const Bytes bytes = Written(all);
     int refused = 0;
-    for (std::size_t size = 0; size < bytes.size(); ++size)
-    {
+    for (std::size_t size = 0; size < bytes.size(); ++size) {
         Everything read;
         refused += Refuses(Bytes(bytes.begin(), bytes.begin() + size), read);
     }
     CHECK(refused, bytes.size());
 }
 
-void CheckLimits()
-{
+ROW(Limits) {
     vesk::ArchiveLimits limits;
     limits.m_bytes = 8;
     limits.m_depth = 3;

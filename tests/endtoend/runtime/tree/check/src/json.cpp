@@ -1,48 +1,37 @@
 // Values and objects as JSON and by name, known by their records alone.
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/graph.h"
 @import "kinds/plain.h"
 @import "Vesk/vxObject/Json.h"
 
 using namespace kinds;
 
-namespace
-{
+namespace {
 
 // Quotes as apostrophes, for text that is full of them.
-vesk::xstring Q(vesk::xstring text)
-{
+vesk::xstring Q(vesk::xstring text) {
     std::replace(text.begin(), text.end(), '\'', '"');
     return text;
 }
 
-vesk::xstring JsonOf(vesk::Value const& value)
-{
-    try
-    {
+vesk::xstring JsonOf(vesk::Value const& value) {
+    try {
         return vesk::ToJson(value);
-    }
-    catch (vesk::AccessError const& error)
-    {
+    } catch (vesk::AccessError const& error) {
         return error.what();
     }
 }
 
 template <typename T>
-vesk::xstring Json(T const& value)
-{
+vesk::xstring Json(T const& value) {
     return JsonOf(vesk::Value::Of(value));
 }
 
 template <typename T>
-vesk::xstring ErrorOf(T& value, std::string_view text, vesk::JsonLimits const& limits = {})
-{
-    try
-    {
+vesk::xstring ErrorOf(T& value, std::string_view text, vesk::JsonLimits const& limits = {}) {
+    try {
         vesk::FromJsonText(value, text, limits);
-    }
-    catch (vesk::AccessError const& error)
-    {
+    } catch (vesk::AccessError const& error) {
         return error.what();
     }
     return "none";
@@ -50,15 +39,13 @@ vesk::xstring ErrorOf(T& value, std::string_view text, vesk::JsonLimits const& l
 
 // What the value is after the text was read, or the error.
 template <typename T>
-vesk::xstring Read(std::string_view text)
-{
+vesk::xstring Read(std::string_view text) {
     T value = T();
     const vesk::xstring error = ErrorOf(value, text);
     return error == "none" ? Json(value) : error;
 }
 
-Part MakePart(int32 number, vesk::string8 const& name)
-{
+Part MakePart(int32 number, vesk::string8 const& name) {
     Part part;
     part.number = number;
     part.name = name;
@@ -66,8 +53,7 @@ Part MakePart(int32 number, vesk::string8 const& name)
     return part;
 }
 
-void Fill(Reflected& r)
-{
+void Fill(Reflected& r) {
     r.flag = true;
     r.i8 = -128;
     r.i64 = INT64_MIN;
@@ -109,8 +95,7 @@ void Fill(Reflected& r)
 
 }
 
-void CheckJsonBothWays()
-{
+ROW(JsonBothWays) {
     Reflected r;
     Fill(r);
     const vesk::xstring text = Json(r);
@@ -177,8 +162,7 @@ void CheckJsonBothWays()
     CHECK(back == values, true);
 }
 
-void CheckJsonErrors()
-{
+ROW(JsonErrors) {
     typedef vesk::xvector<int32> Ints;
     for (auto [text, error] : std::initializer_list<std::pair<const char*, const char*>>{
              {"", "line 1, column 1: expected a value"},
@@ -200,8 +184,7 @@ void CheckJsonErrors()
              {"[\"1x\"]", "line 1, column 2: expected an integer"},
              {"[true]", "line 1, column 2: expected a number"},
              {"{}", "line 1, column 1: expected an array"},
-             {"[-2147483648, \"2147483647\"]", "[-2147483648,2147483647]"}})
-    {
+             {"[-2147483648, \"2147483647\"]", "[-2147483648,2147483647]"}}) {
         CHECK(Read<Ints>(text), error);
     }
     CHECK(Read<vesk::string8>("\"\xff\""), "line 1, column 2: text is not UTF-8");
@@ -215,8 +198,7 @@ void CheckJsonErrors()
     CHECK(Json(vesk::string8("\xff")), "string is not UTF-8");
     CHECK(Read<vesk::float64>("1e999"), "line 1, column 1: out of range");
     for (auto text : {"1e-999", "0.0001e-330", "0.1e-99999999999999999999"}) CHECK(Read<vesk::float64>(text), "0");
-    for (auto text : {"100000e305", "1e99999999999999999999", "-1e+309"})
-    {
+    for (auto text : {"100000e305", "1e99999999999999999999", "-1e+309"}) {
         CHECK(Read<vesk::float64>(text), "line 1, column 1: out of range");
     }
     CHECK(Read<vesk::float32>("1e39"), "line 1, column 1: out of range");
@@ -275,8 +257,7 @@ void CheckJsonErrors()
             auto copy = value;
             const bool isWritten = !Throws([&] { vesk::ToJsonText(value, {indent}, bounds); });
             const bool isRead = ErrorOf(copy, text, bounds) == "none";
-            if constexpr (std::is_same<decltype(value), vesk::pref<IDoc>>::value)
-            {
+            if constexpr (std::is_same<decltype(value), vesk::pref<IDoc>>::value) {
                 if (isRead) copy->DestroyObject();
             }
             refused += !isRead;
@@ -298,8 +279,7 @@ void CheckJsonErrors()
     CHECK(part.number, 2);
 }
 
-void CheckJsonObjects()
-{
+ROW(JsonObjects) {
     // A cycle of two, by interfaces.
     Doc doc, next;
     doc.title = "one";
@@ -324,8 +304,7 @@ void CheckJsonObjects()
     const vesk::xstring flat = vesk::ObjectToJson(vesk::ptr<IDoc>(&chain[0]));
     vesk::ptr<IDoc> at = vesk::ObjectFromJson<IDoc>(flat);
     ssize_t length = 0;
-    while (at)
-    {
+    while (at) {
         Doc* object = static_cast<Doc*>(at.Object());
         at = object->next.Get();
         object->DestroyObject();
@@ -369,8 +348,7 @@ void CheckJsonObjects()
           "line 1, column 82: kinds::Doc is no kinds::Part");
 }
 
-void CheckAccess()
-{
+ROW(Access) {
     Reflected r;
     Fill(r);
     const vesk::Value value = vesk::Value::Of(r);
@@ -378,8 +356,7 @@ void CheckAccess()
     CHECK(value.Find("parts[1].marks[0]").As<vesk::int8>(), 1);
     CHECK(value.Find("deep[-4][0][a]").Text(), "1.5");
     CHECK(value.Find("byColour").Text(), "[(Green,3)]");
-    for (const char* path : {"parts[9]", "parts[-1]", "parts[01]", "parts[", "[", "nothing.at.all"})
-    {
+    for (const char* path : {"parts[9]", "parts[-1]", "parts[01]", "parts[", "[", "nothing.at.all"}) {
         if (value.Find(path)) CHECK(path, "nothing");
     }
     CHECK(value.Find("parts").TypeName(), "xvector<kinds::Part>");
@@ -425,12 +402,9 @@ void CheckAccess()
     CHECK(r.s8, "renamed");
     Reflected const& fixed = r;
     auto error = [](auto call) {
-        try
-        {
+        try {
             call();
-        }
-        catch (vesk::AccessError const& e)
-        {
+        } catch (vesk::AccessError const& e) {
             return vesk::xstring(e.what());
         }
         return vesk::xstring();

@@ -1,24 +1,20 @@
 // Long chains, many links, many keys: as fast for each as for few, and no deeper on the stack.
-@import "check.h"
+@import "rows/rows.h"
 @import "check/src/nodes.h"
 
 #include <ctime>
-#include <thread>
 
-namespace
-{
+namespace {
 
 // Whether an action takes the processor time of a linear one. (What is quadratic takes minutes.)
 template <typename Action>
-bool IsQuick(Action action)
-{
+bool IsQuick(Action action) {
     const std::clock_t begin = std::clock();
     action();
     return std::clock() - begin < 6 * CLOCKS_PER_SEC;
 }
 
-vesk::xvector<Chained> Chain(int length)
-{
+vesk::xvector<Chained> Chain(int length) {
     vesk::xvector<Chained> chain(length);
     for (int i = 1; i < length; ++i) chain[i].previous = &chain[i - 1];
     for (Chained& link : chain) link.x = 1;
@@ -27,8 +23,7 @@ vesk::xvector<Chained> Chain(int length)
 
 }
 
-void CheckChains()
-{
+ROW(Chains) {
     const int length = 60000;
     vesk::xvector<Chained> chain = Chain(length);
     CHECK(IsQuick([&] { CHECK(chain.back().depth.read(), length); }), true);
@@ -43,8 +38,7 @@ void CheckChains()
     for (int i = 1; i < length; ++i) chain[i].isCareless = true;
     CHECK(chain.back().depth.read(), length + 1);
     // A circle of that length is found.
-    for (Chained& link : chain)
-    {
+    for (Chained& link : chain) {
         link.depth.TryEvict(true);
         link.isCareless = false;
     }
@@ -54,8 +48,7 @@ void CheckChains()
     CHECK(chain.back().depth.read(), length + 1);
 }
 
-void CheckManyLinks()
-{
+ROW(ManyLinks) {
     vesk::xvector<Sums> many(100000);
     Gathers gathers;
     gathers.many = &many;
@@ -64,16 +57,14 @@ void CheckManyLinks()
         for (Sums& one : many) one.x = 1;
         CHECK(gathers.total.read(), 200000);
         CHECK(gathers.total.Inputs().size(), 100001);
-        for (int i = 0; i < 5; ++i)
-        {
+        for (int i = 0; i < 5; ++i) {
             for (Sums& one : many) one.x = 2;
         }
         CHECK(gathers.total.read(), 400000);
     }), true);
     vesk::xvector<Scales> all(100000);
     CHECK(IsQuick([&] {
-        for (Scales& one : all)
-        {
+        for (Scales& one : all) {
             one.one = &many[0];
             one.scaled.read();
         }
@@ -91,8 +82,7 @@ void CheckManyLinks()
     }), true);
 }
 
-void CheckManyWrites()
-{
+ROW(ManyWrites) {
     const int count = 20000;
     Field field;
     Operated operated;
@@ -105,8 +95,7 @@ void CheckManyWrites()
         for (int i = 0; i < count; ++i) operated.map[i] = 1;
         CHECK(w.ofField.read(), 0);
         CHECK(w.ofOperated.read(), count);
-        for (int i = 0; i < 3 * count; ++i)
-        {
+        for (int i = 0; i < 3 * count; ++i) {
             field.cells[i % count] = 1;
             operated.map[i % count] = 2;
             field.a = i;
@@ -115,38 +104,4 @@ void CheckManyWrites()
         CHECK(w.ofField.read(), count + 3 * count - 1);
         for (int i = 0; i < count; ++i) field.a = i;
     }), true);
-}
-
-// One graph in each thread.
-void CheckGraphThreads()
-{
-    vesk::xvector<int32> results(4);
-    vesk::xvector<std::thread> threads;
-    for (int32& result : results)
-    {
-        threads.emplace_back([&result] {
-            vesk::xvector<Chained> chain = Chain(500);
-            Field field;
-            Watcher w;
-            w.field = &field;
-            vesk::xvector<Scales> all(100);
-            Sums sums;
-            int changes = 0;
-            vesk::ModelHook hook([&changes](vesk::ModelChange const&) { ++changes; });
-            for (int i = 0; i < 100; ++i)
-            {
-                chain[0].x = i;
-                field.a = i;
-                sums.x = i;
-                all[i].one = &sums;
-                result = chain.back().depth + w.ofField + sums.b + all[i].later(i);
-                result += int32(vesk::RunAsyncCalculations());
-            }
-            vesk::EvictionQueue::Get(0).EvictDownTo(-1);
-            result += changes + int32(vesk::EvictionQueue::Get(0).Count());
-        });
-    }
-    for (std::thread& thread : threads) thread.join();
-    for (int32 result : results) CHECK(result, results[0]);
-    CHECK(results[0], 499 + 99 + 99 + 199 + 1 + 100);
 }

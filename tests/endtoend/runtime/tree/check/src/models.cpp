@@ -1,21 +1,18 @@
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/models.h"
 @import "kinds/kinds.h"
 
 using namespace kinds;
 
 template <typename T>
-vesk::xvector<vesk::octet_t> Written(T const& value)
-{
+vesk::xvector<vesk::octet_t> Written(T const& value) {
     vesk::Archive ar;
     ar << value;
     return ar.m_bytes;
 }
 
-void CheckArchives()
-{
-    for (vesk::uint32 v : {0u, 127u, 128u, 16383u, 16384u, 2097151u, 2097152u, 268435455u, 268435456u, 4294967295u})
-    {
+ROW(Archives) {
+    for (vesk::uint32 v : {0u, 127u, 128u, 16383u, 16384u, 2097151u, 2097152u, 268435455u, 268435456u, 4294967295u}) {
         vesk::Archive ar;
         vesk::SerialiseVariableLengthUint(ar, v);
         vesk::InputArchive input(ar);
@@ -66,8 +63,7 @@ void CheckArchives()
     CHECK(all < read && read != all, true);
 }
 
-void CheckSchemas()
-{
+ROW(Schemas) {
     // The project writes release 3. The archive of a Doc says which release its bytes are of.
     Doc1 old;
     old.title = "T";
@@ -111,8 +107,7 @@ void CheckSchemas()
     CHECK(Throws([&] { vesk::ReadObject<IDoc>(whole); }), true);
 }
 
-void CheckChanges()
-{
+ROW(Changes) {
     vesk::xvector<vesk::xstring> changes;
     vesk::ModelHook hook([&changes](vesk::ModelChange const& change) {
         changes.push_back(vxMakeString(int(change.m_kind) << change.PathText()));

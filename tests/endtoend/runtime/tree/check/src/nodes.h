@@ -4,8 +4,7 @@
 
 $warning(disable: 1009)
 
-$struct Sums
-{
+$struct Sums {
     $indep int32 x;
     $dep int32 a = { a = x; };
     $dep int32 b = { b = a + 100; };
@@ -15,8 +14,7 @@ $struct Sums
 };
 
 $struct Pair : model { int32 first; int32 second; } { };
-$struct Writes
-{
+$struct Writes {
     $indep int32 x;
     $dep int32 counted = { ++calculated; counted = x; if (isWriting) const_cast<Writes*>(this)->x = counted + 1; };
     $dep int32 behind = { behind = counted * 10; };
@@ -35,8 +33,7 @@ $struct Writes
     mutable int32 calculated = 0;
 };
 
-$struct Breaks
-{
+$struct Breaks {
     $indep int32 x;
     $dep int32 broken =
     {
@@ -51,8 +48,7 @@ $struct Breaks
     mutable int32 calculated = 0;
 };
 
-$struct Chained
-{
+$struct Chained {
     Chained* previous = nullptr;
     bool isCareless = false;
     $indep int32 x;
@@ -60,34 +56,28 @@ $struct Chained
     {
         ++calculated;
         depth = x;
-        if (isCareless)
-        {
+        if (isCareless) {
             try { depth += previous->depth; } catch (...) {}
-        }
-        else if (previous)
-        {
+        } else if (previous) {
             depth += previous->depth;
         }
     };
     mutable int32 calculated = 0;
 };
 
-$struct Gathers
-{
+$struct Gathers {
     vesk::xvector<Sums>* many = nullptr;
     $indep int32 rounds;
     $dep int32 total =
     {
         total = 0;
-        for (int i = 0; i < rounds; ++i)
-        {
+        for (int i = 0; i < rounds; ++i) {
             for (Sums const& one : *many) total += one.x;
         }
     };
 };
 
-$struct Scales
-{
+$struct Scales {
     Sums* one = nullptr;
     $dep int32 scaled = { scaled = one->x * 2; };
     $cache <<async>> int32 later(int32 n) const with int32 in = { in = one->x + n; }; { return in * 2; }
@@ -100,8 +90,7 @@ $struct Plain : model { int32 a; int32 cells[]; xmap<int32,xmap<int32,int32>> ma
 $struct Around : model { Plain inner; int32 other; } { };
 $struct+ Operated isa vesk::IObject : model { xmap<int32,int32> map; xmap<string8,int32> words; kinds::Size size; } { };
 
-$struct Watcher
-{
+$struct Watcher {
     Field* field = nullptr;
     Plain* plain = nullptr;
     Around* around = nullptr;
@@ -132,8 +121,7 @@ $class+ Linked isa kinds::IDoc : model { pref<kinds::IDoc> next; int32 number; c
 public:
     Linked() { ++s_count; }
     Linked(Linked const& rhs) : BaseClass(rhs) { ++s_count; }
-    ~Linked()
-    {
+    ~Linked() {
         --s_count;
         if (ownsNext && next.read()) next.read()->DestroyObject();
     }
@@ -146,15 +134,13 @@ public:
     static inline bool s_wasMade = false;
     Unlike() { s_wasMade = true; }
 };
-$class+ Kept isa vesk::IObject
-{
+$class+ Kept isa vesk::IObject {
 public:
     Kept* other = nullptr;
     Kept* owned = nullptr;
     static inline int32 s_count = 0;
     Kept() { ++s_count; }
-    ~Kept()
-    {
+    ~Kept() {
         --s_count;
         if (owned) owned->DestroyObject();
     }

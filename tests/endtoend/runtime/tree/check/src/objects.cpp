@@ -1,34 +1,28 @@
 // Objects in archives and on the heap: long chains, what a refused archive leaves, archives of before, what $new made.
-@import "check.h"
+@import "rows/rows.h"
 @import "check/src/nodes.h"
 
 $function Kept* MakeKept() { return $new Kept(); }
 
-namespace
-{
+namespace {
 
-vesk::xvector<vesk::octet_t> ChainBytes(int length)
-{
+vesk::xvector<vesk::octet_t> ChainBytes(int length) {
     vesk::xvector<Linked> chain(length);
-    for (int i = 0; i < length; ++i)
-    {
+    for (int i = 0; i < length; ++i) {
         chain[i].number = i;
         if (i + 1 < length) chain[i].next = &chain[i + 1];
     }
     return vesk::WriteObject(vesk::ptr<kinds::IDoc>(&chain[0]));
 }
 
-void Append(vesk::xvector<vesk::octet_t>& bytes, std::string const& text)
-{
+void Append(vesk::xvector<vesk::octet_t>& bytes, std::string const& text) {
     bytes.insert(bytes.end(), text.begin(), text.end());
 }
 
 // As archives were written that have one object within the other.
-vesk::xvector<vesk::octet_t> NestedBytes(int length)
-{
+vesk::xvector<vesk::octet_t> NestedBytes(int length) {
     vesk::xvector<vesk::octet_t> bytes;
-    for (int i = 1; i <= length; ++i)
-    {
+    for (int i = 1; i <= length; ++i) {
         vesk::octet_t number[5];
         bytes.insert(bytes.end(), number, vesk::SerialiseVariableLengthInteger(number, i));
         Append(bytes, std::string("\x06Linked\x01"));
@@ -40,15 +34,13 @@ vesk::xvector<vesk::octet_t> NestedBytes(int length)
 
 }
 
-void CheckLinkedObjects()
-{
+ROW(LinkedObjects) {
     const int length = 100000;
     vesk::xvector<vesk::octet_t> bytes = ChainBytes(length);
     CHECK(Linked::s_count, 0);
     vesk::ptr<kinds::IDoc> at = vesk::ReadObject<kinds::IDoc>(bytes);
     CHECK(Linked::s_count, length);
-    for (int i = 0; at; ++i)
-    {
+    for (int i = 0; at; ++i) {
         Linked* object = static_cast<Linked*>(at.Object());
         if (object->number != i) CHECK(object->number.read(), i);
         at = object->next.read();
@@ -59,8 +51,7 @@ void CheckLinkedObjects()
     // Whatever is missing, nothing is left behind; not even where objects destroy what they refer to.
     bytes = ChainBytes(20);
     Linked::ownsNext = true;
-    for (std::size_t size = 0; size < bytes.size(); ++size)
-    {
+    for (std::size_t size = 0; size < bytes.size(); ++size) {
         const vesk::xvector<vesk::octet_t> part(bytes.begin(), bytes.begin() + size);
         if (!Throws([&] { vesk::ReadObject<kinds::IDoc>(part); })) CHECK(size, "refused");
     }
@@ -75,8 +66,7 @@ void CheckLinkedObjects()
     CHECK(Linked::s_count, 0);
 }
 
-void CheckReadClasses()
-{
+ROW(ReadClasses) {
     Unlike unlike;
     Linked linked;
     const vesk::xvector<vesk::octet_t> bytes = vesk::WriteObject(vesk::ptr<kinds::IDoc>(&unlike));
@@ -94,8 +84,7 @@ void CheckReadClasses()
     read->DestroyObject();
 
     // A struct and what it begins with have one address and are two objects.
-    struct Outer : kinds::Size
-    {
+    struct Outer : kinds::Size {
         void Serialise(vesk::Archive& ar) const { kinds::Size::Serialise(ar); }
         void Deserialise(vesk::InputArchive& ar) { kinds::Size::Deserialise(ar); }
     } outer;
@@ -118,8 +107,7 @@ void CheckReadClasses()
     delete b.Get();
 }
 
-void CheckHeap()
-{
+ROW(Heap) {
     vesk::ObjectHeap& heap = vesk::ObjectHeap::Get();
     heap.Collect({});
     CHECK(heap.Count(), 0);

@@ -1,32 +1,26 @@
 // Values that are given parts of themselves, and what fails in the middle; the releases of an archive's projects;
 // classes that nobody registered.
-@import "check.h"
+@import "rows/rows.h"
 @import "check/src/own.h"
 @import "kinds/kinds.h"
 @import "Vesk/vxObject/Json.h"
 
-namespace vesk
-{
+namespace vesk {
 XTarget* kinds_GetXTarget();
 XTarget* check_GetXTarget();
 }
 
 using namespace kinds;
 
-namespace
-{
+namespace {
 
 typedef vesk::xvector<vesk::octet_t> Bytes;
 
 template <typename Action>
-vesk::xstring ErrorOf(Action action)
-{
-    try
-    {
+vesk::xstring ErrorOf(Action action) {
+    try {
         action();
-    }
-    catch (std::exception const& error)
-    {
+    } catch (std::exception const& error) {
         return error.what();
     }
     return "none";
@@ -36,17 +30,14 @@ vesk::xstring ErrorOf(Action action)
 vesk::string8 Word(int n) { return vxMakeString("a word with the number " << n); }
 
 template <typename M>
-void CheckOwnFields()
-{
+void CheckOwnFields() {
     M own;
     vesk::xvector<vesk::string8> words;
-    for (int i = 0; i < 3; ++i)
-    {
+    for (int i = 0; i < 3; ++i) {
         own.words.push_back(Word(i));
         words.push_back(Word(i));
     }
-    for (int i = 0; i < 100; ++i)
-    {
+    for (int i = 0; i < 100; ++i) {
         // At full capacity and below, at the end and ahead of it.
         own.words.push_back(own.words.read()[i % 3]);
         words.push_back(vesk::string8(words[i % 3]));
@@ -63,15 +54,13 @@ void CheckOwnFields()
     own.words.insert(0, own.words.read().data(), 0);
     CHECK(own.words.read().size(), words.size());
 
-    for (int i = 0; i < 6; ++i)
-    {
+    for (int i = 0; i < 6; ++i) {
         if (i == 0) own.text.insert(0, Word(7).data(), 5);
         own.text.insert(i, own.text.read().data() + 1, vesk::ssize_t(own.text.read().size()) - 2);
         own.text.push_back(own.text.read()[2]);
     }
     vesk::string8 text = Word(7).substr(0, 5);
-    for (int i = 0; i < 6; ++i)
-    {
+    for (int i = 0; i < 6; ++i) {
         text.insert(i, std::string(text, 1, text.size() - 2));
         text.push_back(text[2]);
     }
@@ -88,8 +77,7 @@ void CheckOwnFields()
 Tree Leaf(int n) { return Tree(int32(n)); }
 Tree Node(vesk::xvector<Tree> branches) { return Tree(Tree::node(branches)); }
 
-struct Branch
-{
+struct Branch {
     int32 number;
     vesk::xlist<Branch> list;
     vesk::xmap<int32, Branch> map;
@@ -98,20 +86,17 @@ struct Branch
 
 // Assigns a container a part of itself.
 template <typename C>
-void CheckOwnParts(C container, C const& (*partOf)(C const&))
-{
+void CheckOwnParts(C container, C const& (*partOf)(C const&)) {
     const vesk::xstring part = vxMakeString(partOf(container));
     container = partOf(container);
     CHECK(container, part);
 }
 
-struct Counted
-{
+struct Counted {
     Counted() { Make(); }
     Counted(Counted const&) { Make(); }
     ~Counted() { --s_count; }
-    static void Make()
-    {
+    static void Make() {
         if (s_count == 3) throw std::bad_alloc();
         ++s_count;
     }
@@ -120,8 +105,7 @@ struct Counted
 
 }
 
-void CheckOwnParts()
-{
+ROW(OwnParts) {
     CheckOwnFields<Owns>();
     CheckOwnFields<OwnsPlain>();
     Owns own;
@@ -154,23 +138,19 @@ void CheckOwnParts()
     vesk::DestructArray(made, 0, 2);
 }
 
-namespace
-{
+namespace {
 
 // An archive of WriteObject in the given releases of the two projects.
-Bytes HolderBytes(int kindsRelease, Bytes const& size)
-{
+Bytes HolderBytes(int kindsRelease, Bytes const& size) {
     Bytes bytes = {0xFF, 'v', 'x', 2, 2, 5, 'c', 'h', 'e', 'c', 'k', 1, 5, 'k', 'i', 'n', 'd', 's'};
     bytes.push_back(vesk::octet_t(kindsRelease));
-    for (Bytes const& part : {Bytes{0, 2, 6, 'H', 'o', 'l', 'd', 'e', 'r', 1}, size, Bytes{8, 0, 0, 0}})
-    {
+    for (Bytes const& part : {Bytes{0, 2, 6, 'H', 'o', 'l', 'd', 'e', 'r', 1}, size, Bytes{8, 0, 0, 0}}) {
         bytes.insert(bytes.end(), part.begin(), part.end());
     }
     return bytes;
 }
 
-vesk::xstring ReadHolder(Bytes const& bytes)
-{
+vesk::xstring ReadHolder(Bytes const& bytes) {
     vesk::xstring text;
     const vesk::xstring error = ErrorOf([&] {
         const vesk::ptr<IDoc> read = vesk::ReadObject<IDoc>(bytes);
@@ -182,8 +162,7 @@ vesk::xstring ReadHolder(Bytes const& bytes)
 
 }
 
-void CheckProjects()
-{
+ROW(Projects) {
     Holder holder;
     holder.size.model() = Size(20);
     holder.behind = 8;
@@ -223,8 +202,7 @@ void CheckProjects()
     CHECK(ReadHolder(before), "Holder(Size(20,7,Red,Mid),8)");
     before.push_back(0);
     CHECK(ReadHolder(before), "bytes behind the object");
-    for (std::size_t size = 4; size < bytes.size(); ++size)
-    {
+    for (std::size_t size = 4; size < bytes.size(); ++size) {
         const Bytes part(bytes.begin(), bytes.begin() + size);
         if (!Throws([&] { vesk::ReadObject<IDoc>(part); })) CHECK(size, "refused");
     }
@@ -246,8 +224,7 @@ void CheckProjects()
 }
 
 // The last of all: this project is not registered any more behind it.
-void CheckForgotten()
-{
+void CheckForgotten() {
     vesk::UnregisterTarget(vesk::check_GetXTarget());
     Holder holder;
     const vesk::ptr<IDoc> object(&holder);

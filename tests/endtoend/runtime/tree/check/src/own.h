@@ -5,8 +5,7 @@
 $warning(disable: 1009)
 
 // With operations and without.
-$class+ Owns isa kinds::IDoc : model
-{
+$class+ Owns isa kinds::IDoc : model {
     xvector<string8> words;
     string8 text;
     xset<string8> names;
@@ -15,8 +14,7 @@ $class+ Owns isa kinds::IDoc : model
 }
 {
 };
-$struct OwnsPlain : model
-{
+$struct OwnsPlain : model {
     xvector<string8> words; string8 text; xset<string8> names; xmap<string8,assignable<string8>> map;
 }
 {
@@ -26,6 +24,5 @@ $struct OwnsPlain : model
 $class+ Holder isa kinds::IDoc : model { kinds::Size size; int32 behind; }
 {
 };
-$class+ Refers isa kinds::IDoc : model kinds::Size
-{
+$class+ Refers isa kinds::IDoc : model kinds::Size {
 };

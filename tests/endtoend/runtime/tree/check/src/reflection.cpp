@@ -1,24 +1,21 @@
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/kinds.h"
 @import "kinds/graph.h"
 @import "kinds/remote.h"
 
 using vesk::Find;
 
-vesk::xstring FieldsOf(vesk::ConstStringZ name)
-{
+vesk::xstring FieldsOf(vesk::ConstStringZ name) {
     vesk::ReflectedClass const& record = *Find<vesk::ReflectedClass>(name);
     return vesk::TextOf([&](vesk::xostream& os) {
-        for (vesk::ssize_t i = 0; i < record.m_numFields; ++i)
-        {
+        for (vesk::ssize_t i = 0; i < record.m_numFields; ++i) {
             vesk::ReflectedField const& field = record.m_fields[i];
             os << vesk::TypeText({field.m_type, record.m_strings}) << ' ' << field.m_name << ';';
         }
     });
 }
 
-void CheckReflection()
-{
+ROW(Reflection) {
     shapes::Point point;
     point.x = 3;
     point.y = 4;
@@ -95,8 +92,7 @@ void CheckReflection()
     CHECK(vesk::RegisterReflectedClass(&other, nullptr) == vesk::NSE_ALREADY_DEFINED, true);
 }
 
-void CheckInterfaces()
-{
+ROW(Interfaces) {
     shapes::Box box, other;
     const vesk::ptr<shapes::INamedShape> both(&box);
     const vesk::ptr<shapes::IShape> shape = both;
@@ -114,8 +110,7 @@ void CheckInterfaces()
     CHECK(bool(vesk::ptr<shapes::INamed>()), false);
 }
 
-void CheckKinds()
-{
+ROW(Kinds) {
     using kinds::Value;
     vesk::xvector<Value> values;
     values.push_back(Value());

@@ -1,5 +1,5 @@
 // The release of an archive is the archive's own: what one archive says changes nothing in how another one is read.
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/models.h"
 @import "kinds/remote.h"
 
@@ -8,8 +8,7 @@
 
 using namespace kinds;
 
-namespace
-{
+namespace {
 
 // A Doc of the first release: its number, title, pages, count.
 const vesk::xvector<vesk::octet_t> g_oldDoc = {1, 1, 'T', 2, 0, 0, 0, 9, 0, 0, 0};
@@ -18,25 +17,21 @@ const vesk::xvector<vesk::octet_t> g_oldDoc = {1, 1, 'T', 2, 0, 0, 0, 9, 0, 0, 0
 const vesk::xvector<vesk::octet_t> g_oldSize = {20, 0, 0, 0, 7, 0, 0, 0};
 const vesk::xvector<vesk::octet_t> g_newSize = {20, 0, 0, 0, 7, 0, 0, 0, 0, 1};
 
-vesk::xvector<vesk::octet_t> Joined(vesk::xvector<vesk::octet_t> a, vesk::xvector<vesk::octet_t> const& b)
-{
+vesk::xvector<vesk::octet_t> Joined(vesk::xvector<vesk::octet_t> a, vesk::xvector<vesk::octet_t> const& b) {
     a.insert(a.end(), b.begin(), b.end());
     return a;
 }
 
 template <typename Read>
-vesk::xstring SizeText(vesk::InputArchive& input, Read read)
-{
+vesk::xstring SizeText(vesk::InputArchive& input, Read read) {
     Size size;
     read(input, size);
     return vxMakeString(size << ' ' << input.Remaining());
 }
 
 // Between two sizes it reads a current Doc from elsewhere.
-struct ReadsAnother
-{
-    void Deserialise(vesk::InputArchive& ar)
-    {
+struct ReadsAnother {
+    void Deserialise(vesk::InputArchive& ar) {
         ar >> first;
         vesk::Archive written;
         written << Doc();
@@ -49,8 +44,7 @@ struct ReadsAnother
 };
 
 // Its model is of one release and has scalars only.
-void ReadOldScalars()
-{
+void ReadOldScalars() {
     vesk::InputArchive input(vesk::xvector<vesk::octet_t>{1, 5, 0, 0, 0, 6, 0, 0, 0});
     Multi multi;
     multi.Deserialise(input);
@@ -58,8 +52,7 @@ void ReadOldScalars()
 
 }
 
-void CheckReleases()
-{
+ROW(Releases) {
     auto extract = [](vesk::InputArchive& ar, Size& size) { ar >> size; };
     auto call = [](vesk::InputArchive& ar, Size& size) { size.Deserialise(ar); };
     vesk::InputArchive waiting(g_newSize);
@@ -99,12 +92,10 @@ void CheckReleases()
     CHECK(calc.notified, 100);
 }
 
-void CheckThreads()
-{
+ROW(Threads) {
     std::atomic<int> wrong = 0;
     auto read = [&wrong](bool isOld) {
-        for (int i = 0; i < 300; ++i)
-        {
+        for (int i = 0; i < 300; ++i) {
             vesk::InputArchive input(isOld ? Joined(g_oldDoc, g_oldSize) : g_newSize);
             Doc doc;
             Size size;

@@ -1,13 +1,12 @@
 // Calls over a channel, and what each side makes of an end that fails, lies or goes away.
-@import "check.h"
+@import "rows/rows.h"
 @import "kinds/remote.h"
 
 using namespace kinds;
 
 typedef vesk::xvector<vesk::octet_t> Bytes;
 
-void CheckRemote()
-{
+ROW(Remote) {
     Calc calc;
     vesk::LocalChannel channel;
     vesk::Server server(channel.Server());
@@ -35,14 +34,11 @@ void CheckRemote()
     CHECK(Throws([&] { vesk::ptr<ICalc>(lost->Interface())->Add(1, "", sum); }), true);
 }
 
-namespace
-{
+namespace {
 
 // A client and a server in one thread; what the server was told of goes to `errors`.
-struct Wire
-{
-    Wire() : server(channel.Server()), client(channel.Client(), [this] { server.Serve(); })
-    {
+struct Wire {
+    Wire() : server(channel.Server()), client(channel.Client(), [this] { server.Serve(); }) {
         server.OnError([this](std::string const& text) { errors.push_back(text); });
     }
     vesk::LocalChannel channel;
@@ -53,22 +49,17 @@ struct Wire
 
 // A message as a stub sends it.
 template <typename... Values>
-Bytes Message(vesk::uint32 object, vesk::uint32 method, vesk::uint32 answer, Values const&... values)
-{
+Bytes Message(vesk::uint32 object, vesk::uint32 method, vesk::uint32 answer, Values const&... values) {
     vesk::Archive ar;
     for (vesk::uint32 number : {object, method, answer}) vesk::SerialiseVariableLengthUint(ar, number);
     (void)(ar << ... << values);
     return ar.m_bytes;
 }
 
-vesk::xstring ErrorOf(std::function<void()> action)
-{
-    try
-    {
+vesk::xstring ErrorOf(std::function<void()> action) {
+    try {
         action();
-    }
-    catch (vesk::RemoteError const& error)
-    {
+    } catch (vesk::RemoteError const& error) {
         return error.what();
     }
     return "none";
@@ -76,8 +67,7 @@ vesk::xstring ErrorOf(std::function<void()> action)
 
 }
 
-void CheckRemoteErrors()
-{
+ROW(RemoteErrors) {
     Calc calc;
     Wire wire;
     calc.onSwap = [](vesk::string8& a) {
@@ -128,8 +118,7 @@ void CheckRemoteErrors()
     CHECK(text, "outer1!");
 }
 
-void CheckRemoteMessages()
-{
+ROW(RemoteMessages) {
     Calc calc;
     Wire wire;
     const vesk::uint32 number = wire.server.Export(vesk::ptr<ICalc>(&calc));
@@ -164,8 +153,7 @@ void CheckRemoteMessages()
     // An error's text is cut to the limit, between characters.
     calc.onSwap = [](vesk::string8& a) { throw std::runtime_error(a + vesk::string8(1000, 'x')); };
     int32 n = 0;
-    for (vesk::string8 text : {"", "a", "ab\xC3\xA9"})
-    {
+    for (vesk::string8 text : {"", "a", "ab\xC3\xA9"}) {
         const vesk::xstring begin = text;
         const vesk::xstring error = ErrorOf([&] { far->Swap(text, n); });
         CHECK(error, begin + vesk::xstring(93 - begin.size(), 'x'));
@@ -190,8 +178,7 @@ void CheckRemoteMessages()
     CHECK(ErrorOf([&] { far->Swap(text, n); }), "message of 95 bytes, the limit is 20");
 }
 
-void CheckRemoteAnswers()
-{
+ROW(RemoteAnswers) {
     // A server that does nothing but send what it is told to.
     vesk::LocalChannel channel;
     Bytes reply;
@@ -233,8 +220,7 @@ void CheckRemoteAnswers()
     CHECK(ErrorOf([&] { vesk::ptr<ICalc>(loose->Interface())->Ping(); }), "stub without a connection");
 }
 
-void CheckRemotePersistable()
-{
+ROW(RemotePersistable) {
     Kept kept;
     Wire wire;
     const vesk::uint32 number = wire.server.Export(vesk::ptr<IKept>(&kept));

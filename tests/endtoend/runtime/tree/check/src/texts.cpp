@@ -1,19 +1,17 @@
 // Text of scalars, and the registry: copies of records, what projects take along.
-@import "check.h"
+@import "rows/rows.h"
 @import "check/src/nodes.h"
 
 #include <clocale>
 #include <locale>
 
-void CheckTexts()
-{
+ROW(Texts) {
     char text[] = "text";
     CHECK(text, "text");
     CHECK(vxMakeString(0.1 << ' ' << 0.1f << ' ' << 1e300 << ' ' << 2.0 << ' ' << 123456789.25),
           "0.1 0.1 1e+300 2 123456789.25");
     CHECK(vxMakeString(int8(-5) << ' ' << vesk::uint64(-1) << ' ' << true << 'c'), "-5 18446744073709551615 truec");
-    struct Grouping : std::numpunct<char>
-    {
+    struct Grouping : std::numpunct<char> {
         char do_thousands_sep() const override { return '\''; }
         char do_decimal_point() const override { return ','; }
         std::string do_grouping() const override { return std::string(1, 3); }
@@ -27,8 +25,7 @@ void CheckTexts()
     }), "{\n    1\n\n    2.5x\n}\n");
 }
 
-void CheckCopies()
-{
+ROW(Copies) {
     // What another module of the process would have.
     const vesk::ReflectedInterface record = vesk::GetReflectedInterface<kinds::IDoc>();
     vesk::ReflectedInterface other = record;

@@ -8,15 +8,13 @@
 
 vxDefineTarget(kinds, 3)
 
-namespace kinds
-{
+namespace kinds {
 
 vesk::string8 Mixed::Name() const { return "mixed"; }
 
 $function int Local(int n) { return $new Deferred() ? n : 0; }
 
-$adt+ implement Stack
-{
+$adt+ implement Stack {
 public:
     int32 Depth() const { return m_depth; }
     void Push(int32 n) { m_depth += n; }

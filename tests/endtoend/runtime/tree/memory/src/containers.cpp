@@ -2,8 +2,7 @@
 
 $warning(disable: 1009)
 
-$class+ Kept isa vesk::IObject
-{
+$class+ Kept isa vesk::IObject {
 public:
     vesk::xvector<Kept*> others;
     static inline int32 s_count = 0;
@@ -14,13 +13,11 @@ public:
 $struct+ Listed isa vesk::IObject : model { xvector<string8> words; int32 count; } { };
 $struct+ Barred <<-genop>> isa vesk::IObject : model { xvector<string8> words; } { };
 
-namespace
-{
+namespace {
 
 Kept* Make() { return $new Kept(); }
 
-void Heap(Faults& faults)
-{
+void Heap(Faults& faults) {
     vesk::ObjectHeap& heap = vesk::ObjectHeap::Get();
     Kept* const root = Make();
     for (int i = 0; i < 3; ++i) root->others.push_back(Make());
@@ -31,8 +28,7 @@ void Heap(Faults& faults)
     });
     faults.Expect(Kept::s_count >= 3, "what is reached is kept");
     // A collection that was given up remembers none of them.
-    while (!root->others.empty())
-    {
+    while (!root->others.empty()) {
         root->others.back()->DestroyObject();
         root->others.pop_back();
     }
@@ -40,8 +36,7 @@ void Heap(Faults& faults)
     faults.Expect(Kept::s_count == 0 && heap.Count() == 0, "all objects are collected");
 }
 
-void DynamicArrays(Faults& faults)
-{
+void DynamicArrays(Faults& faults) {
     const vesk::string8 text(40, 'x');
     vesk::DynArray<vesk::string8> array = {text, text};
     faults.Try([&] {
@@ -53,8 +48,7 @@ void DynamicArrays(Faults& faults)
     faults.Expect(array.size() >= 2 && array[0] == text && array[1] == text, "items are kept");
 }
 
-void ModelVectors(Faults& faults)
-{
+void ModelVectors(Faults& faults) {
     Listed listed;
     listed.words.push_back(vesk::string8(40, 'a'));
     int changes = 0;
@@ -74,27 +68,22 @@ void ModelVectors(Faults& faults)
 
 // A hook that erases what stands ahead of the position of a write.
 template <typename Object>
-void ErasingHook(Faults& faults)
-{
+void ErasingHook(Faults& faults) {
     Object object;
     for (int i = 0; i < 4; ++i) object.words.push_back(vesk::string8(40, 'a'));
     bool isRefused = false;
     const bool isDone = faults.Try([&] {
         vesk::ModelHook hook([&](vesk::ModelChange const&) { object.words.model().clear(); });
-        try
-        {
+        try {
             object.words.push_back(object.words.read()[3]);
-        }
-        catch (std::out_of_range const&)
-        {
+        } catch (std::out_of_range const&) {
             isRefused = true;
         }
     });
     faults.Expect(isRefused || !isDone, "a write whose position is gone is refused");
 }
 
-void Hooks(Faults& faults)
-{
+void Hooks(Faults& faults) {
     Listed listed;
     int changes = 0;
     vesk::ModelHook outer([&](vesk::ModelChange const&) { ++changes; });
@@ -112,7 +101,6 @@ void Hooks(Faults& faults)
 
 }
 
-vesk::xvector<Scenario> ContainerScenarios()
-{
+vesk::xvector<Scenario> ContainerScenarios() {
     return {{"heap", Heap}, {"dynamic arrays", DynamicArrays}, {"model vectors", ModelVectors}, {"hooks", Hooks}, {"erasing hook", ErasingHook<Listed>}, {"erasing hook, no operations", ErasingHook<Barred>}};
 }

@@ -2,8 +2,7 @@
 
 $warning(disable: 1009)
 
-$struct Sums
-{
+$struct Sums {
     $indep int32 x;
     $dep int32 a = { a = x; };
     $dep int32 b = { b = a + x + 100; };
@@ -14,8 +13,7 @@ $struct Sums
 };
 
 // Goes on without what it cannot have.
-$struct Careless
-{
+$struct Careless {
     Sums* sums = nullptr;
     $dep int32 taken =
     {
@@ -24,27 +22,23 @@ $struct Careless
     };
 };
 
-$struct Many
-{
+$struct Many {
     vesk::xvector<Sums>* all = nullptr;
     $dep int32 total =
     {
         total = 0;
-        for (int round = 0; round < 2; ++round)
-        {
+        for (int round = 0; round < 2; ++round) {
             for (Sums const& one : *all) total += one.x;
         }
     };
 };
 
-$struct Writer
-{
+$struct Writer {
     $indep int32 x;
     $dep int32 counted = { counted = x; if (counted < 10) const_cast<Writer*>(this)->x = counted + 1; };
 };
 
-$struct Chained
-{
+$struct Chained {
     Chained* previous = nullptr;
     $indep int32 x;
     $dep int32 depth = { depth = x; if (previous) depth += previous->depth; };
@@ -52,8 +46,7 @@ $struct Chained
 
 $struct+ Operated isa vesk::IObject : model { int32 a; xmap<string8,int32> words; } { };
 $struct+ Named <<-genop>> isa vesk::IObject : model { int32 a; xmap<int32,int32> map; } { };
-$struct Watcher
-{
+$struct Watcher {
     Operated* operated = nullptr;
     Named* named = nullptr;
     $dep int32 ofOperated = { ofOperated = operated->a + operated->words["a word of some length"]; };
@@ -61,11 +54,9 @@ $struct Watcher
     $dep int32 careless = { careless = -1; try { careless = operated->a + named->a; } catch (std::bad_alloc const&) {} };
 };
 
-namespace
-{
+namespace {
 
-void FirstReads(Faults& faults)
-{
+void FirstReads(Faults& faults) {
     Sums sums;
     sums.x = 1;
     faults.Try([&] { sums.text.read(); });
@@ -74,8 +65,7 @@ void FirstReads(Faults& faults)
     faults.Expect(sums.b == 104, "later values");
 }
 
-void Changes(Faults& faults)
-{
+void Changes(Faults& faults) {
     Sums sums;
     Careless careless;
     careless.sums = &sums;
@@ -94,8 +84,7 @@ void Changes(Faults& faults)
     faults.Expect(careless.taken == 123, "what goes on without an input still follows it");
 }
 
-void ManyInputs(Faults& faults)
-{
+void ManyInputs(Faults& faults) {
     vesk::xvector<Sums> all(40);
     Many many;
     many.all = &all;
@@ -111,8 +100,7 @@ void ManyInputs(Faults& faults)
     faults.Expect(many.total == 242 && many.total.Inputs().size() == 40, "values follow once more");
 }
 
-void WritesInside(Faults& faults)
-{
+void WritesInside(Faults& faults) {
     Writer writer;
     writer.x = 7;
     faults.Try([&] {
@@ -122,11 +110,9 @@ void WritesInside(Faults& faults)
     faults.Expect(writer.counted == 10, "what a calculation wrote is read");
 }
 
-void Chains(Faults& faults)
-{
+void Chains(Faults& faults) {
     vesk::xvector<Chained> chain(12);
-    for (std::size_t i = 0; i < chain.size(); ++i)
-    {
+    for (std::size_t i = 0; i < chain.size(); ++i) {
         chain[i].x = 1;
         if (i > 0) chain[i].previous = &chain[i - 1];
     }
@@ -144,8 +130,7 @@ void Chains(Faults& faults)
     faults.Expect(chain.back().depth == 36 || chain[6].previous != &chain[5], "values follow");
 }
 
-void Caches(Faults& faults)
-{
+void Caches(Faults& faults) {
     Sums sums;
     sums.x = 1;
     faults.Try([&] {
@@ -159,8 +144,7 @@ void Caches(Faults& faults)
     faults.Expect(sums.plus(1) == 3 && sums.ofCache == 3, "values of keys follow");
 }
 
-void AsyncCaches(Faults& faults)
-{
+void AsyncCaches(Faults& faults) {
     Sums sums;
     sums.x = 1;
     faults.Try([&] {
@@ -175,8 +159,7 @@ void AsyncCaches(Faults& faults)
     faults.Expect(sums.later() == 6, "an async value");
 }
 
-void Models(Faults& faults)
-{
+void Models(Faults& faults) {
     Operated operated;
     Named named;
     Watcher watcher;
@@ -207,8 +190,7 @@ void Models(Faults& faults)
 
 }
 
-vesk::xvector<Scenario> GraphScenarios()
-{
+vesk::xvector<Scenario> GraphScenarios() {
     return {{"first reads", FirstReads}, {"changes", Changes},          {"many inputs", ManyInputs}, {"writes inside", WritesInside},
             {"chains", Chains},          {"caches", Caches},            {"async caches", AsyncCaches}, {"models", Models}};
 }

@@ -5,28 +5,22 @@
 #include <new>
 
 // Which allocation fails, in one run of a scenario.
-class Faults
-{
+class Faults {
 public:
     enum EWhich { One, AllBehind };
     explicit Faults(int position, EWhich which) : m_left(position), m_which(which) {}
 
     // Whether the action came to its end. Only here do allocations fail.
     template <typename Action>
-    bool Try(Action action)
-    {
-        struct Scope
-        {
+    bool Try(Action action) {
+        struct Scope {
             explicit Scope(Faults* faults) { s_active = faults; }
             ~Scope() { s_active = nullptr; }
         } scope(this);
-        try
-        {
+        try {
             action();
             return true;
-        }
-        catch (std::bad_alloc const&)
-        {
+        } catch (std::bad_alloc const&) {
             return false;
         }
     }
@@ -46,8 +40,7 @@ private:
 };
 
 // A scenario makes what it needs itself, so that each of its runs begins alike.
-struct Scenario
-{
+struct Scenario {
     const char* name;
     void (*run)(Faults&);
 };

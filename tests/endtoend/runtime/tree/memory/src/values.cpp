@@ -7,8 +7,7 @@ $warning(disable: 1009)
 
 $model+ Spot { int32 x; string8 label; };
 $variant+ Choice { void; string8; *{ xvector<Choice> parts; } node; string8 inPlace; int32 number; };
-$class+ Item isa vesk::IPersistable : model
-{
+$class+ Item isa vesk::IPersistable : model {
     string8 name;
     pref<vesk::IPersistable> next;
     cref<Spot> spot;
@@ -27,23 +26,19 @@ public:
     ~Item() { --s_count; }
 };
 
-namespace
-{
+namespace {
 
 const vesk::string8 g_long(40, 'x');
 
 Item* MakeItem() { return $new Item(); }
 
-Choice MakeTree()
-{
+Choice MakeTree() {
     const Choice inner = Choice::node({Choice(Choice::inPlace(g_long))});
     return Choice::node({Choice(g_long), inner, Choice(Choice::number(3))});
 }
 
-struct Items
-{
-    Items() : spot(3, g_long)
-    {
+struct Items {
+    Items() : spot(3, g_long) {
         Item::model_type& model = first.model();
         model.name = g_long;
         model.next = vesk::ptr<vesk::IPersistable>(&second);
@@ -62,16 +57,14 @@ struct Items
 };
 
 // What was read: the first leads to the second, both to the spot.
-void Destroy(vesk::ptr<vesk::IPersistable> const& read)
-{
+void Destroy(vesk::ptr<vesk::IPersistable> const& read) {
     Item* const first = static_cast<Item*>(read.Object());
     delete first->spot.read().Get();
     first->next.read().Get()->DestroyObject();
     first->DestroyObject();
 }
 
-void Archives(Faults& faults)
-{
+void Archives(Faults& faults) {
     Items items;
     vesk::xvector<vesk::octet_t> bytes;
     faults.Try([&] { bytes = vesk::WriteObject(items.First()); });
@@ -82,8 +75,7 @@ void Archives(Faults& faults)
     faults.Expect(Item::s_count == 2, "no object is left");
 }
 
-void Json(Faults& faults)
-{
+void Json(Faults& faults) {
     Items items;
     vesk::xstring text;
     faults.Try([&] { text = vesk::ObjectToJson(items.First(), {2}); });
@@ -96,20 +88,16 @@ void Json(Faults& faults)
     // A value that is changed field by field.
     const vesk::xstring value = vesk::ToJsonText(items.first);
     Item changed;
-    if (faults.Try([&] { vesk::FromJsonText(changed, value); }))
-    {
+    if (faults.Try([&] { vesk::FromJsonText(changed, value); })) {
         changed.next.read().Get()->DestroyObject();
         delete changed.spot.read().Get();
-    }
-    else
-    {
+    } else {
         faults.Expect(!changed.next.read() && !changed.spot.read(), "no reference to what is gone");
     }
     faults.Expect(Item::s_count == 3, "no object is left in a value");
 }
 
-void Values(Faults& faults)
-{
+void Values(Faults& faults) {
     Items items;
     const vesk::Value value = vesk::Value::Of(items.first);
     faults.Try([&] {
@@ -121,8 +109,7 @@ void Values(Faults& faults)
     faults.Expect(word == g_long || word == vesk::string8(50, 'y'), "a value is old or new");
 }
 
-void Variants(Faults& faults)
-{
+void Variants(Faults& faults) {
     const Choice tree = MakeTree();
     vesk::Archive ar;
     ar << tree << tree;
@@ -148,8 +135,7 @@ void Variants(Faults& faults)
     for (Choice const& one : many) faults.Expect(one.GetTag() >= 0, "a vector's elements have values");
 }
 
-void OpenVariants(Faults& faults)
-{
+void OpenVariants(Faults& faults) {
     const vesk::openvariant<int32> before = g_long;
     vesk::openvariant<int32> any = before;
     vesk::Archive ar;
@@ -164,8 +150,7 @@ void OpenVariants(Faults& faults)
     faults.Expect(any == before || any.as<Spot>().x == 4, "an openvariant that is read is old or new");
 }
 
-void NewObjects(Faults& faults)
-{
+void NewObjects(Faults& faults) {
     vesk::ObjectHeap& heap = vesk::ObjectHeap::Get();
     Item* made = nullptr;
     faults.Try([&] { made = MakeItem(); });
@@ -175,8 +160,7 @@ void NewObjects(Faults& faults)
 
 }
 
-vesk::xvector<Scenario> ValueScenarios()
-{
+vesk::xvector<Scenario> ValueScenarios() {
     return {{"archives", Archives}, {"json", Json}, {"values", Values}, {"variants", Variants},
             {"openvariants", OpenVariants}, {"new objects", NewObjects}};
 }

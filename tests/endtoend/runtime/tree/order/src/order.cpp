@@ -9,8 +9,7 @@ vxDefineTarget(order, 1)
 $class+ Keys isa vesk::IPersistable : model { xmap<int32,int32> numbers; xmap<string8,xmap<int16,int32>> nested; } { };
 
 template <typename T>
-void Show(T const& value)
-{
+void Show(T const& value) {
     vesk::Archive ar;
     ar << value;
     const vesk::xvector<vesk::octet_t> bytes = ar.m_bytes;
@@ -20,8 +19,7 @@ void Show(T const& value)
     vesk::xout() << bytes << (read == value && input.Remaining() == 0 ? "" : " is read as another value") << "\n";
 }
 
-int main()
-{
+int main() {
     Show(vesk::int8(-2));
     Show(true);
     Show(vesk::int16(258));

@@ -2,8 +2,7 @@
 
 vxDefineTarget(shapes, 1)
 
-namespace shapes
-{
+namespace shapes {
 
 vesk::string8 Box::Name() const { return "box"; }
 $function+ int32 Twice(int32 n) { return 2 * n; }

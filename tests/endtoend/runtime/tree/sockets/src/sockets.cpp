@@ -11,30 +11,25 @@
 vxDefineTarget(sockets, 1)
 void Register_Project_sockets();
 
-$interface+ rmi ISum : vesk::IObject
-{
+$interface+ rmi ISum : vesk::IObject {
     void Add([in] int32 n, [in] const string8& text, [out] int32& length);
     void Tell([in] int32 n);
     void Say([in] int32 size, [out] string8& text);
     void Nest([out] int32& n);
 };
-$class+ Sum isa ISum
-{
+$class+ Sum isa ISum {
 public:
-    void Add(int32 n, const vesk::string8& text, int32& length)
-    {
+    void Add(int32 n, const vesk::string8& text, int32& length) {
         if (n < 0) throw std::invalid_argument("negative");
         sum += n;
         length = int32(text.size());
     }
-    void Tell(int32 n)
-    {
+    void Tell(int32 n) {
         told += n;
         std::this_thread::sleep_for(std::chrono::microseconds(50));
     }
     void Say(int32 size, vesk::string8& text) { text.assign(size, 'x'); }
-    void Nest(int32& n)
-    {
+    void Nest(int32& n) {
         if (nest) nest();
         n = 1;
     }
@@ -48,20 +43,15 @@ typedef std::chrono::milliseconds Time;
 typedef boost::asio::ip::tcp Tcp;
 typedef vesk::xvector<vesk::octet_t> Bytes;
 
-void Check(bool is, const char* what)
-{
+void Check(bool is, const char* what) {
     if (!is) vesk::xout() << "not so: " << what << '\n';
 }
 #define CHECK(is) Check(is, #is)
 
-vesk::xstring ErrorOf(std::function<void()> const& action)
-{
-    try
-    {
+vesk::xstring ErrorOf(std::function<void()> const& action) {
+    try {
         action();
-    }
-    catch (vesk::RemoteError const& error)
-    {
+    } catch (vesk::RemoteError const& error) {
         return error.what();
     }
     return "none";
@@ -70,12 +60,10 @@ vesk::xstring ErrorOf(std::function<void()> const& action)
 const int kClients = 4;
 const int kCalls = 25;
 
-struct Client
-{
+struct Client {
     explicit Client(vesk::uint16 port)
         : channel(vesk::SocketChannel::Connect("127.0.0.1", port)), connection(*channel),
-          stub(vesk::Import<ISum>(connection, 1)), sum(stub->Interface())
-    {
+          stub(vesk::Import<ISum>(connection, 1)), sum(stub->Interface()) {
         connection.SetTimeout(Time::max());
         channel->SetTimeout(Time::max());
     }
@@ -86,13 +74,11 @@ struct Client
 };
 
 // How many calls gave what they must.
-int Call(vesk::uint16 port)
-{
+int Call(vesk::uint16 port) {
     int right = 0;
     Client client(port);
     int32 length = 0;
-    for (int i = 0; i < kCalls; ++i)
-    {
+    for (int i = 0; i < kCalls; ++i) {
         client.sum->Add(1, vesk::string8(i * 1000, 'x'), length);
         right += length == i * 1000;
     }
@@ -101,8 +87,7 @@ int Call(vesk::uint16 port)
     // Answers that are too long for this client alone.
     client.channel->SetMessageLimit(5000);
     vesk::string8 text;
-    for (int size : {5000, 1000000, 100})
-    {
+    for (int size : {5000, 1000000, 100}) {
         const vesk::xstring error = ErrorOf([&] { client.sum->Say(size, text); });
         const int bytes = size + (size > 5000 ? 5 : 4);  // with the number, the kind and the text's length
         right += error == (size == 100 ? vesk::xstring("none") : vesk::TooLongText(bytes, 5000));
@@ -111,14 +96,11 @@ int Call(vesk::uint16 port)
 }
 
 // A server without a thread, which serves until `isDone` or for so long.
-struct Host
-{
-    Host() : server(0, [this](vesk::Server& client) { client.Export(vesk::ptr<ISum>(&sum)); })
-    {
+struct Host {
+    Host() : server(0, [this](vesk::Server& client) { client.Export(vesk::ptr<ISum>(&sum)); }) {
         server.OnError([this](std::string const& text) { ++errors, lastError = text; });
     }
-    Time Serve(Time time, std::function<bool()> const& isDone = nullptr)
-    {
+    Time Serve(Time time, std::function<bool()> const& isDone = nullptr) {
         const auto begin = Clock::now();
         server.ServeUntil([&] { return Clock::now() - begin > time || (isDone && isDone()); });
         return std::chrono::duration_cast<Time>(Clock::now() - begin);
@@ -130,17 +112,13 @@ struct Host
 };
 
 // A client that sends what it likes.
-struct Raw
-{
-    explicit Raw(Host& host) : socket(io)
-    {
+struct Raw {
+    explicit Raw(Host& host) : socket(io) {
         socket.connect(Tcp::endpoint(boost::asio::ip::address_v4::loopback(), host.server.Port()));
     }
-    void Send(Bytes const& message, int times = 1)
-    {
+    void Send(Bytes const& message, int times = 1) {
         Bytes bytes;
-        for (int i = 0; i < times; ++i)
-        {
+        for (int i = 0; i < times; ++i) {
             bytes.insert(bytes.end(), {vesk::octet_t(message.size()), 0, 0, 0});
             bytes.insert(bytes.end(), message.begin(), message.end());
         }
@@ -149,8 +127,7 @@ struct Raw
     }
     void End() { socket.shutdown(Tcp::socket::shutdown_send); }
     // All that comes until the server closes.
-    Bytes Rest()
-    {
+    Bytes Rest() {
         Bytes bytes(1000);
         boost::system::error_code error;
         bytes.resize(boost::asio::read(socket, boost::asio::buffer(bytes.data(), bytes.size()), error));
@@ -166,8 +143,7 @@ const Bytes kSay = {1, 2, 9, 2, 0, 0, 0};
 const Bytes kNest = {1, 3, 9};
 
 // Who ends its sending gets its answers; who leaves is served, but for what leads to nothing.
-void CheckLeaving()
-{
+void CheckLeaving() {
     Host host;
     {
         Raw raw(host);
@@ -191,8 +167,7 @@ void CheckLeaving()
 }
 
 // The end is kept, and others are served, while one client sends more than can be carried out.
-void CheckFlood()
-{
+void CheckFlood() {
     Host host;
     Raw flood(host);
     std::thread sending([&flood] { flood.Send(kTell, 100000); });
@@ -207,8 +182,7 @@ void CheckFlood()
 }
 
 // At the limit of descriptors the clients that are there are served, those that wait later, and nothing spins.
-void CheckDescriptors()
-{
+void CheckDescriptors() {
     Host host;
     Raw first(host);
     host.Serve(Time(5000), [&] { return host.server.Clients() == 1; });
@@ -228,8 +202,7 @@ void CheckDescriptors()
 }
 
 // Methods that serve while they are called by a client that leaves, and that call their own server.
-void CheckNesting()
-{
+void CheckNesting() {
     Host host;
     {
         Raw raw(host);
@@ -256,8 +229,7 @@ void CheckNesting()
           "[the object is served by the thread that calls it,none,none]xx1");
 }
 
-int main()
-{
+int main() {
     Register_Project_sockets();
     Sum sum;
     vesk::SocketServer server(0, [&sum](vesk::Server& client) { client.Export(vesk::ptr<ISum>(&sum)); });
@@ -269,8 +241,7 @@ int main()
     for (std::thread& client : clients) client.join();
     server.Stop();
     serving.join();
-    for (int count : right)
-    {
+    for (int count : right) {
         if (count != kCalls + 4) vesk::xout() << count << " calls of a client went well\n";
     }
     CheckLeaving();

@@ -17,19 +17,16 @@ public:
     $cache <<async>> int32 later(int32 n) const with int32 in = { in = number + n; }; { return in; }
 };
 $model+ Plain { int32 number; xmap<int32,int32> map; openvariant<int32> any; };
-$interface+ rmi ISum : vesk::IObject
-{
+$interface+ rmi ISum : vesk::IObject {
     void Add([in] int32 n, [out] int32& total);
 };
-$class+ Sum isa ISum
-{
+$class+ Sum isa ISum {
 public:
     void Add(int32 n, int32& out) { out = total += n; }
     $int32 total;
 };
 
-$struct Chained
-{
+$struct Chained {
     Chained* previous = nullptr;
     $indep int32 x;
     $dep int32 depth = { depth = x + (previous ? previous->depth.read() : 0); };
@@ -38,8 +35,7 @@ $function Part* MakePart();
 $function Part* MakePart() { return $new Part(); }
 
 // Calls an object of this thread, and changes it by name.
-int CallSum(int rounds)
-{
+int CallSum(int rounds) {
     Sum sum;
     sum.total = 0;
     vesk::LocalChannel channel;
@@ -48,30 +44,26 @@ int CallSum(int rounds)
     const auto stub = vesk::Import<ISum>(client, server.Export(vesk::ptr<ISum>(&sum)));
     const vesk::ptr<ISum> far(stub->Interface());
     int32 total = 0;
-    for (int i = 0; i < rounds; ++i)
-    {
+    for (int i = 0; i < rounds; ++i) {
         far->Add(i, total);
         vesk::Value::Of(sum).Find("total").Set(int32(total + 1));
     }
     return total;
 }
 
-int Work(int rounds)
-{
+int Work(int rounds) {
     int result = 0;
     int changes = 0;
     vesk::ModelHook hook([&changes](vesk::ModelChange const&) { ++changes; });
     vesk::xvector<Chained> chain(1000);
-    for (std::size_t i = 0; i < chain.size(); ++i)
-    {
+    for (std::size_t i = 0; i < chain.size(); ++i) {
         chain[i].x = 1;
         if (i > 0) chain[i].previous = &chain[i - 1];
     }
     Part part, other;
     part.next = &other;
     Plain plain;
-    for (int i = 0; i < rounds; ++i)
-    {
+    for (int i = 0; i < rounds; ++i) {
         chain[0].x = i;
         part.number = i;
         plain.number = i;
@@ -93,8 +85,7 @@ int Work(int rounds)
     return result + changes + CallSum(rounds) + int32(vesk::EvictionQueue::Get(0).Count());
 }
 
-int main()
-{
+int main() {
     Register_Project_threads();
     int results[4];
     std::thread threads[4];

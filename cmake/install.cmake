@@ -1,0 +1,37 @@
+# What `cmake --install` and `cpack` take. `Qrex --init` finds its templates beside the program or in ../share/qrex of it.
+include(GNUInstallDirs)
+set_source_files_properties(src/driver/init.cpp PROPERTIES COMPILE_DEFINITIONS
+                            QREX_DATA_FOLDER="${CMAKE_INSTALL_FULL_DATADIR}/qrex")
+
+install(TARGETS Qrex RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
+install(DIRECTORY templates DESTINATION ${CMAKE_INSTALL_DATADIR}/qrex COMPONENT tool)
+install(FILES README.md CHANGELOG.md HACKING.md DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/qrex COMPONENT tool)
+install(DIRECTORY docs DESTINATION ${CMAKE_INSTALL_DATADIR}/doc/qrex COMPONENT tool)
+install(FILES ${manual}/Qrex.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONENT tool)
+install(FILES ${manual}/Qrex.bash DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME Qrex COMPONENT tool)
+install(FILES ${manual}/_Qrex DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions COMPONENT tool)
+install(DIRECTORY runtime DESTINATION ${CMAKE_INSTALL_DATADIR}/qrex COMPONENT runtime)
+
+set(CPACK_PACKAGE_NAME qrex)
+set(CPACK_PACKAGE_VERSION ${PROJECT_VERSION})
+set(CPACK_PACKAGE_DESCRIPTION_SUMMARY "translator and build driver for C++ with reflection")
+set(CPACK_PACKAGE_CONTACT "Qrex maintainers <maintainers@qrex.example>")
+set(CPACK_GENERATOR DEB TGZ)
+set(CPACK_STRIP_FILES ON)
+set(CPACK_COMPONENTS_ALL tool runtime)
+set(CPACK_VERBATIM_VARIABLES ON)
+set(CPACK_PROJECT_CONFIG_FILE ${CMAKE_SOURCE_DIR}/cmake/package.cmake)
+set(CPACK_PRE_BUILD_SCRIPTS ${CMAKE_SOURCE_DIR}/cmake/debian_files.cmake)
+set(CPACK_THREADS 0)
+
+set(CPACK_DEBIAN_FILE_NAME DEB-DEFAULT)
+set(CPACK_DEBIAN_PACKAGE_SECTION devel)
+set(CPACK_DEBIAN_PACKAGE_SHLIBDEPS ON)
+set(CPACK_DEBIAN_PACKAGE_RECOMMENDS g++)
+set(CPACK_DEBIAN_PACKAGE_DESCRIPTION
+"Qrex stands in front of a C++ tool chain. It translates declarations
+ that begin with $ into plain C++ with reflection, serialisation and
+ interfaces, runs a macro language of @ directives, writes project files
+ for Visual Studio, Code::Blocks, Geany and make, and builds what is
+ stale with the compiler at hand.")
+include(CPack)

@@ -1,0 +1,33 @@
+// What a user may type, once for all who tell it: `Qrex --help`, the manual page, the table of keys in docs/projects.md
+// and the completions of shells.
+#pragma once
+
+#include <string>
+#include <string_view>
+
+namespace qrex {
+
+// A way to call the program. In `arguments` capital letters stand for what the caller puts there.
+struct CallForm {
+  std::string_view option;  // empty: a configuration
+  std::string_view arguments;
+  std::string_view help;  // lines
+};
+inline constexpr CallForm kCallForms[] = {
+    {"", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...]",
+     "does what the configuration says. NAME is seen as $(NAME) in every file; each LINE stands\n"
+     "behind those of the file and so overrides them, as in: Qrex zoo.qrex mode=gen"},
+    {"", "[*]FOLDER/FILE.sln",
+     "stands for FILE.qrex, with * for FILE.translate.qrex, and builds build_FILE.sln afterwards"},
+    {"--init", "NAME [FOLDER]", "lays out a workspace that builds and runs, in the folder NAME; overwrites nothing"},
+    {"--help", "", "this text"},
+    {"--version", "", "the release"},
+};
+
+std::string HelpText();
+std::string ManualPage();  // in the man macros of troff
+std::string KeyTable();    // in Markdown, a row for each key
+std::string BashCompletion();
+std::string ZshCompletion();
+
+}  // namespace qrex

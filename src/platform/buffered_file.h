@@ -1,0 +1,33 @@
+// A file that is read and written through a buffer.
+#pragma once
+
+#include <cstdint>
+#include <cstdio>
+#include <string>
+#include <string_view>
+
+#include "platform/error.h"
+
+namespace qrex::platform {
+
+class BufferedFile {
+ public:
+  BufferedFile() = default;
+  ~BufferedFile();
+  BufferedFile(const BufferedFile&) = delete;
+  BufferedFile& operator=(const BufferedFile&) = delete;
+
+  Result Open(const std::string& path, const char* mode);  // "r", "w", "a", "rb", ...; what was open is closed
+  bool IsOpen() const { return m_stream != nullptr; }
+  size_t Read(void* buffer, size_t length);
+  Result Write(std::string_view bytes);
+  Result Flush();
+  Result Close();  // a failure: bytes got lost; it is closed all the same
+  int64_t Position() const;
+  bool Seek(int64_t position);
+
+ private:
+  std::FILE* m_stream = nullptr;
+};
+
+}  // namespace qrex::platform

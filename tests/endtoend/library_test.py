@@ -1,0 +1,135 @@
+#!/usr/bin/env python3
+"""Programs of the runtime's library alone: under sanitizers, in threads, in plug-ins, with the other byte order, without memory."""
+
+import re
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from runtime_fixture import PLAIN, has_asio, link, run_tour, translate  # noqa: E402
+from workspace_fixture import Skipped, equal, holds, need, run_tests  # noqa: E402
+
+# The tour and the scenarios without memory.
+ADDRESSES = "g++ -std=c++17 -g1 -fsanitize=address,undefined -fno-sanitize=bool -Wall -Werror -Wno-deprecated-declarations"
+
+# Loads plug-ins and unloads them. "own": the program holds a copy of their project itself.
+HOST = """#include "twice/twice.h"
+#include <dlfcn.h>
+#include <cstdio>
+
+void Register_Project_twice();
+
+template <typename Function>
+Function* Symbol(void* module, const char* name) { return reinterpret_cast<Function*>(dlsym(module, name)); }
+
+const char* Found()
+{
+    vesk::ReflectedClass const* record = vesk::Find<vesk::ReflectedClass>("Twice");
+    return record ? record->m_name : "none";
+}
+
+int main()
+{
+#ifdef OWN
+    Register_Project_twice();
+#endif
+    void* modules[2];
+    for (int i = 0; i < 2; ++i)
+    {
+        modules[i] = dlopen(i == 0 ? "./a.so" : "./b.so", RTLD_NOW | RTLD_LOCAL);
+        if (!modules[i]) return std::puts(dlerror());
+        Symbol<void()>(modules[i], "Load")();
+        vesk::AnyInterface any;
+        Symbol<void(vesk::AnyInterface*)>(modules[i], "Make")(&any);
+        const vesk::ptr<vesk::IObject> object(any);
+#ifdef OWN
+        const vesk::ptr<ITwice> twice = vesk::QueryInterface<ITwice>(object);
+        std::printf("%d ", twice ? twice->Number() : 0);
+#endif
+        object->DestroyObject();
+    }
+    std::printf("%s", Found());
+    dlclose(modules[0]);
+    std::printf(" %s", Found());
+    Symbol<void()>(modules[1], "Unload")();
+    std::printf(" %s\\n", Found());
+    dlclose(modules[1]);
+}
+"""
+
+
+def test_undefined_behaviour(binary):
+    """A $dep bool is copied ahead of its first value (docs/runtime.md), which -fsanitize=bool would tell."""
+    need("g++")
+    run_tour(binary, ADDRESSES)
+
+
+def test_byte_order(binary):
+    """Scalars are little-endian in archives; the forced switch turns them around, both ways."""
+    need("g++")
+    workspace, root = translate(binary, "order.qrws")
+    with workspace:
+        link(workspace, PLAIN, [f"{root}/order/src/order.cpp"], "plain")
+        link(workspace, PLAIN + " -DVESK_SWAP_SCALARS", [f"{root}/order/src/order.cpp"], "swapped")
+        plain, swapped = (workspace.shell(f"./{program}").splitlines() for program in ("plain", "swapped"))
+        one = ",".join(["0"] * 15)
+        equal(plain, ["[254]", "[1]", "[2,1]", "[4,3,2,1]", "[254,255,255,255,255,255,255,255]", f"[1,{one}]",
+                      "[0,0,0,0,0,0,240,63]", "[2,97,98]", "[2,97,0,97,0]", "[2,1,0,2,0]", "[2,1,0,2,0]", "[1,1,0,0,0]",
+                      "[1,3,0,1,99]", "numbers[300]", "nested[k][300]"])
+        equal(swapped, ["[254]", "[1]", "[1,2]", "[1,2,3,4]", "[255,255,255,255,255,255,255,254]", f"[{one},1]",
+                        "[63,240,0,0,0,0,0,0]", "[2,97,98]", "[2,0,97,0,97]", "[2,0,1,0,2]", "[2,0,1,0,2]", "[1,0,0,0,1]",
+                        "[1,0,3,1,99]", "numbers[300]", "nested[k][300]"])
+
+
+def run_with_thread_sanitizer(binary, name, output):
+    need("g++", "setarch")
+    workspace, root = translate(binary, f"{name}.qrws")
+    with workspace:
+        link(workspace, "g++ -std=c++17 -g1 -O1 -fsanitize=thread -Wno-tsan", [f"{root}/{name}/src/{name}.cpp"], name, "-lpthread")
+        # Some kernels place the program where the sanitizer wants its own memory.
+        equal(re.sub(r"(?m)^ +a", "a", workspace.shell(f"setarch -R ./{name}")), output)
+
+
+def test_threads(binary):
+    """A graph, archives, a connection and JSON in each thread do not meet those of others; all print whole lines, if
+    with an indentation of another one's."""
+    run_with_thread_sanitizer(binary, "threads", "a line\n" * 80 + "flush left\n0 0 0 0 0\n")
+
+
+def test_sockets(binary):
+    """A server in one thread, stopped by another, and its clients in threads of their own; clients that leave or flood,
+    no descriptors, methods that serve or call while they are called."""
+    need("g++")
+    if not has_asio():
+        raise Skipped("boost/asio.hpp")
+    run_with_thread_sanitizer(binary, "sockets", "100\n")
+
+
+def test_memory(binary):
+    """Each allocation of a scenario fails in turn: nothing is lost, destroyed twice or left wrong."""
+    need("g++")
+    workspace, root = translate(binary, "memory.qrws", "compilableText = true")
+    with workspace:
+        link(workspace, ADDRESSES, [f"{root}/memory/src/{name}.cpp" for name in ("containers", "graph", "memory", "values")], "memory")
+        holds(workspace.shell("./memory"), " runs, 0 failures\n")
+
+
+def test_modules(binary):
+    """Two plug-ins and a program that hold copies of one project."""
+    need("g++")
+    workspace, root = translate(binary, "twice.qrws")
+    with workspace:
+        compiler = f"{PLAIN} -I{root}"
+        objects = f"{root}/twice/src/twice.cpp library.o"
+        workspace.shell(f"{PLAIN} -I{root} -c library.cpp")
+        workspace.write("host.cpp", HOST)
+        workspace.shell(f"{compiler} -shared {objects} -o a.so && cp a.so b.so")
+        # A program that exports nothing has a registry of its own; its records and those of the plug-ins are copies.
+        workspace.shell(f"{compiler} -DOWN host.cpp {objects} -o own")
+        equal(workspace.shell("./own"), "7 7 Twice Twice Twice\n")
+        # One that exports its symbols has the registry of all.
+        workspace.shell(f"{compiler} -rdynamic host.cpp library.o -o host")
+        equal(workspace.shell("./host"), "Twice Twice none\n")
+
+
+run_tests([test_undefined_behaviour, test_byte_order, test_threads, test_sockets, test_memory, test_modules])

@@ -1,0 +1,59 @@
+// A list of checks that fills itself.
+#pragma once
+@import "Vesk/vxObject/IObject.h"
+
+#include <cstdio>
+
+inline int g_checks = 0;
+inline int g_failures = 0;
+
+// As texts: numbers of different types are equal then.
+template <typename Got, typename Expected>
+void Compare(Got const& got, Expected const& expected, const char* what, const char* file, int line) {
+    ++g_checks;
+    const vesk::xstring text = vxMakeString(got);
+    if (text == vxMakeString(expected)) return;
+    ++g_failures;
+    std::printf("%s(%d): %s is %s\n", file, line, what, text.c_str());
+}
+#define CHECK(got, expected) Compare(got, expected, #got, __FILE__, __LINE__)
+
+struct Row {
+    explicit Row(void (*check)()) : check(check), next(s_first) { s_first = this; }
+    void (*check)();
+    Row* next;
+    static inline Row* s_first = nullptr;
+};
+#define ROW(name) static void Check_##name(); static const Row s_row_##name(Check_##name); static void Check_##name()
+
+inline int RunRows() {
+    for (Row const* row = Row::s_first; row; row = row->next) row->check();
+    std::printf("%d checks, %d failures\n", g_checks, g_failures);
+    return g_failures > 0;
+}
+
+template <typename Action>
+bool Throws(Action action) {
+    try {
+        action();
+    } catch (std::exception const&) {
+        return true;
+    }
+    return false;
+}
+
+// Through an archive.
+template <typename T>
+void Copy(T const& from, T& to) {
+    vesk::Archive ar;
+    ar << from;
+    vesk::InputArchive input(ar);
+    input >> to;
+}
+
+template <typename T>
+T Copied(T const& from) {
+    T to;
+    Copy(from, to);
+    return to;
+}

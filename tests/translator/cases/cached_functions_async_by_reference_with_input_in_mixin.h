@@ -1,6 +1,0 @@
-@import "Vesk/vxObject/IObject.h"
-$mixin M
-{//
-$cache - ^ <<async io>> void f(xvector<int32>& out) const with string8 in = name(); { }
-int end;
-};

@@ -1,0 +1,21 @@
+struct A;
+
+namespace vesk {
+template<> struct TypeTraits<A> {
+    static const bool is_exported = 0; static const bool is_reflected = 0; static const bool is_registered = 0; static const vesk::ETypeTraitKind kind = vesk::TTK_struct; static const bool has_metadata = 0;
+};
+template<> struct ClassTypeTraits<A> {
+    static const bool has_reflected_default_ctor = 0; static const bool has_reflected_dtor = 0; static const bool has_reflected_copy_ctor = 0; static const bool has_reflected_equality = 0; static const bool has_reflected_compare = 0; static const bool has_reflected_write_xostream = 0; static const bool has_reflected_serialise = 0; static const bool has_reflected_visit_IObjects = 0; static const bool has_reflected_visit_Prefs = 0; static const bool implements_IObject = 0; static const bool implements_IPersistable = 0; static const bool can_serialise_model = 0; static const bool has_model = 0; static const bool using_model_base_class = 0;
+};
+} // namespace vesk
+struct A
+{A() { A * p; if (x) { } }void f() { g(this->GetThisAsFinalClass(), this->GetThisAsFinalClass()); h(vesk::DollarNew(new B(1))); }std::map<int,int> m; /* $ } */int f(int a) const { return "}"[a]; } void g();
+public:
+    std::map<int,int> Getm() const { return m; }
+    void Setm(std::map<int,int> _v) { m = _v; }
+    
+};
+
+
+inline int __stdcall f(A const* _self,int a) { return _self->f(a); }
+inline void __stdcall g(A* _self) { _self->g(); }

@@ -1,3 +1,0 @@
-@import "Vesk/vxObject/IObject.h"
-$struct A
-{$$() { $$ * p; if (x) { } }};

@@ -1,6 +1,0 @@
-@import "Vesk/vxObject/IObject.h"
-struct Before;
-$struct S
-{
-    $functor void G();
-};

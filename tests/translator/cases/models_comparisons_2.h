@@ -1,2 +1,0 @@
-@import "Vesk/vxObject/IObject.h"
-$model M { };

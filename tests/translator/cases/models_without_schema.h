@@ -1,5 +1,0 @@
-@import "Vesk/vxObject/IObject.h"
-$model Point
-{
-    string8 name;
-};
