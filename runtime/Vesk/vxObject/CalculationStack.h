@@ -1,5 +1,5 @@
-// A second stack, for calculations within each other that the thread's own one has no room for: address space, of which
-// only what is used takes memory.
+// A further stack, for calculations within each other that the thread's own one has no room for: address space, of
+// which only what is used takes memory.
 
 @import "Vesk/vxObject/Platform.h"
 #include <cstdint>
@@ -13,7 +13,7 @@ class CalculationStack {
   void operator=(CalculationStack const&) = delete;
   ~CalculationStack() { Close(); }
 
-  // Whether it is there and not in use: there is one alone, and none where the system has no means for it.
+  // Whether it is there and not in use; it is never there where the system has no means for it.
   bool Open();
   void Close() {
     if (m_memory) Unmap();

@@ -199,7 +199,7 @@ struct GraphState : PerThread<GraphState> {
   bool m_isEvaluating = false;
   std::uintptr_t m_stack = 0;  // where the calculations began to use the stack, and how much they may
   std::uintptr_t m_mostStack = 0;
-  CalculationStack m_otherStack;
+  CalculationStack m_otherStacks[4];
   DGNode const* m_deep = nullptr;  // the node of the DeepRead that is on its way
   xvector<Target> m_targets;
   std::size_t m_lastSerial = 0;

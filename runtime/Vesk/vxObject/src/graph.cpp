@@ -4,6 +4,7 @@
 @import "Vesk/vxObject/Graph.h"
 
 #include <algorithm>
+#include <iterator>
 
 namespace vesk {
 
@@ -338,9 +339,12 @@ void DGNode::Calculate(GraphState& state) const {
   CalculateHere(state);
 }
 
-// On the other stack; where that is used up, or there is none, further out.
+// On the next stack; where all are used up, or there is none, further out.
 void DGNode::CalculateElsewhere(GraphState& state) const {
-  if (!state.m_otherStack.Open()) {
+  CalculationStack* const end = std::end(state.m_otherStacks);
+  CalculationStack* const next =
+      std::find_if(std::begin(state.m_otherStacks), end, [](CalculationStack& stack) { return stack.Open(); });
+  if (next == end) {
     state.m_deep = this;
     throw DeepRead();
   }
@@ -353,10 +357,10 @@ void DGNode::CalculateElsewhere(GraphState& state) const {
     std::uintptr_t m_stack = m_state.m_stack, m_most = m_state.m_mostStack;
   } stack{state};
   const auto calculate = [&] {
-    state.MeasureStack(state.m_otherStack.Usable());
+    state.MeasureStack(next->Usable());
     CalculateHere(state);
   };
-  state.m_otherStack.Run(calculate);
+  next->Run(calculate);
 }
 
 void DGNode::CalculateHere(GraphState& state) const {
@@ -445,7 +449,7 @@ inline void Empty(xvector<T>& list) {
 void GraphState::End() {
   m_isEvaluating = false;
   m_deep = nullptr;
-  m_otherStack.Close();
+  for (CalculationStack& stack : m_otherStacks) stack.Close();
   Empty(m_failed);
   Empty(m_targets);
   Empty(m_steps);

@@ -37,7 +37,8 @@ constexpr std::size_t Reserve = 8 << 20, Guard = 64 << 10;
 #if defined(VESK_ADDRESS_SANITIZER) || defined(VESK_THREAD_SANITIZER)
 constexpr std::size_t Most = Reserve + (1 << 20), Least = Most;
 #else
-constexpr std::size_t Most = sizeof(void*) > 4 ? 1 << 30 : 64 << 20, Least = 2 * Reserve;
+// Memcheck tells of each map of 256 MiB.
+constexpr std::size_t Most = (sizeof(void*) > 4 ? 240 : 60) << 20, Least = 2 * Reserve;
 #endif
 
 }  // namespace
