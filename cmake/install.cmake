@@ -1,6 +1,6 @@
 # What `cmake --install` and `cpack` take. `Qrex --init` finds its templates beside the program or in ../share/qrex of it.
 include(GNUInstallDirs)
-set_source_files_properties(src/driver/init.cpp PROPERTIES COMPILE_DEFINITIONS
+set_source_files_properties(src/driver/data_folder.cpp PROPERTIES COMPILE_DEFINITIONS
                             QREX_DATA_FOLDER="${CMAKE_INSTALL_FULL_DATADIR}/qrex")
 
 install(TARGETS Qrex RUNTIME DESTINATION ${CMAKE_INSTALL_BINDIR} COMPONENT tool)
@@ -11,6 +11,8 @@ install(FILES ${manual}/Qrex.1 DESTINATION ${CMAKE_INSTALL_MANDIR}/man1 COMPONEN
 install(FILES ${manual}/Qrex.bash DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME Qrex COMPONENT tool)
 install(FILES ${manual}/_Qrex DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions COMPONENT tool)
 install(DIRECTORY runtime DESTINATION ${CMAKE_INSTALL_DATADIR}/qrex COMPONENT runtime)
+
+include(cmake/built_runtime.cmake)
 
 set(CPACK_PACKAGE_NAME qrex)
 set(CPACK_PACKAGE_VERSION ${PROJECT_VERSION})

@@ -63,7 +63,7 @@ class PayloadReader {
   std::string_view m_rest;
 };
 
-ScannedFile* FindScanned(ProjectBuilder& builder, std::string_view path) {
+ScannedFile* FindScanned(BuildFiles& builder, std::string_view path) {
   const auto known = builder.scannedByPath.find(path);
   if (known != builder.scannedByPath.end()) return known->second.get();
   ProjectFile* file = builder.FindFile(std::string(path));
@@ -72,7 +72,7 @@ ScannedFile* FindScanned(ProjectBuilder& builder, std::string_view path) {
   return nullptr;
 }
 
-bool IsImported(const ProjectBuilder& builder, const ProjectFile& file) {
+bool IsImported(const BuildFiles& builder, const ProjectFile& file) {
   return std::any_of(builder.scannedByPath.begin(), builder.scannedByPath.end(), [&](const auto& entry) {
     const auto& imports = entry.second->imports;
     return std::any_of(imports.begin(), imports.end(), [&](const auto* import) { return &import->file == &file; });
@@ -81,7 +81,7 @@ bool IsImported(const ProjectBuilder& builder, const ProjectFile& file) {
 
 // Whether what was read is of this project, as far as its paths tell: else the main source would register for good what
 // another project declares.
-bool FitsProject(const ProjectBuilder& builder) {
+bool FitsProject(const BuildFiles& builder) {
   const auto isOwn = [&](const ProjectFile& file) { return file.project == &builder.project; };
   const auto fits = [&](const DeclarationRegistry& registry) {
     return std::all_of(registry.entries.begin(), registry.entries.end(), [&](const auto& entry) {
@@ -96,7 +96,7 @@ bool FitsProject(const ProjectBuilder& builder) {
 
 }  // namespace
 
-std::string DependencyPayload(const ProjectBuilder& builder) {
+std::string DependencyPayload(const BuildFiles& builder) {
   std::vector<const ScannedFile*> files;
   for (const auto& [path, file] : builder.scannedByPath) files.push_back(file.get());
   std::sort(files.begin(), files.end(),
@@ -104,7 +104,7 @@ std::string DependencyPayload(const ProjectBuilder& builder) {
   std::string payload;
   for (const ScannedFile* file : files) {
     AppendCompactString(payload, file->file.path);
-    AppendNumber(payload, static_cast<uint64_t>(file->translationTime), 8);
+    AppendNumber(payload, static_cast<uint64_t>(file->times.translation), 8);
     AppendNumber(payload, file->imports.size(), 4);
     for (const ScannedFile* import : file->imports) AppendCompactString(payload, import->file.path);
     payload += file->hasDeclarations ? '\1' : '\0';
@@ -115,12 +115,12 @@ std::string DependencyPayload(const ProjectBuilder& builder) {
   return payload;
 }
 
-bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload) {
+bool ParseDependencyPayload(BuildFiles& builder, std::string_view payload) {
   PayloadReader reader(payload);
   for (std::string_view path; !(path = reader.String()).empty();) {
     ScannedFile* file = FindScanned(builder, path);
     if (!file) return false;
-    file->translationTime = static_cast<int64_t>(reader.Number(8));
+    file->times.translation = static_cast<int64_t>(reader.Number(8));
     for (uint64_t count = reader.Number(4); count > 0; --count) {
       ScannedFile* import = FindScanned(builder, reader.String());
       if (!import) return false;
@@ -133,7 +133,7 @@ bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload) {
   return FitsProject(builder);
 }
 
-bool LoadDependencyFile(ProjectBuilder& builder, const std::string& path) {
+bool LoadDependencyFile(BuildFiles& builder, const std::string& path) {
   std::string payload;
   if (!ReadCheckedFile(kMagic, payload, path)) return false;
   bool loaded = false;
@@ -152,7 +152,7 @@ bool LoadDependencyFile(ProjectBuilder& builder, const std::string& path) {
   return loaded;
 }
 
-void SaveDependencyFile(ProjectBuilder& builder, const std::string& path) {
+void SaveDependencyFile(BuildFiles& builder, const std::string& path) {
   CreateDirectories(path, false);
   builder.settings.leftovers.Beside(path);
   try {

@@ -10,15 +10,15 @@
 
 #include <string>
 
-#include "builder/project_builder.h"
+#include "builder/build_files.h"
 
 namespace qrex {
 
 // False, with the builder as it was, when there is no such file or it does not fit: then every file is translated.
-bool LoadDependencyFile(ProjectBuilder& builder, const std::string& path);
-void SaveDependencyFile(ProjectBuilder& builder, const std::string& path);  // clears the registries' dirty flags
+bool LoadDependencyFile(BuildFiles& builder, const std::string& path);
+void SaveDependencyFile(BuildFiles& builder, const std::string& path);  // clears the registries' dirty flags
 
-std::string DependencyPayload(const ProjectBuilder& builder);
-bool ParseDependencyPayload(ProjectBuilder& builder, std::string_view payload);  // throws DeserialisationException
+std::string DependencyPayload(const BuildFiles& builder);
+bool ParseDependencyPayload(BuildFiles& builder, std::string_view payload);  // throws DeserialisationException
 
 }  // namespace qrex

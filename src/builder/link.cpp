@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <set>
 
-#include "builder/run_command.h"
+#include "builder/build_step.h"
 #include "builder/tool_names.h"
 #include "builder/tools.h"
 #include "text/files.h"
@@ -110,15 +110,15 @@ std::string GccLinkerText(const ProjectBuilder& builder, const std::string& targ
                           const std::vector<std::string>& inputs) {
   std::string text;
   if (builder.project.targetType != TargetType::StaticLibrary) {
-    text += "-o " + QuotedInput(builder.settings, target);
+    text += "-o " + QuotedInput(builder.settings.compiler, target);
     if (builder.project.targetType == TargetType::DynamicLinkLibrary) {
       const std::string name(FileNameOf(target));
       const bool isOneWord = name.find(',') == std::string::npos;  // a comma would end it behind -Wl
-      text += " -shared " + (isOneWord ? Quoted(builder.settings, "-Wl,-soname," + name)
-                                       : "-Xlinker -soname -Xlinker " + Quoted(builder.settings, name));
+      text += " -shared " + (isOneWord ? Quoted(builder.settings.compiler, "-Wl,-soname," + name)
+                                       : "-Xlinker -soname -Xlinker " + Quoted(builder.settings.compiler, name));
     }
   }
-  for (const std::string& input : inputs) text += " " + QuotedInput(builder.settings, input);
+  for (const std::string& input : inputs) text += " " + QuotedInput(builder.settings.compiler, input);
   if (builder.project.targetType == TargetType::StaticLibrary) return text;
   for (const std::string& library : LibrariesOfSubprojects(builder)) text += " \"" + library + "\"";
   text += " -Xlinker -rpath -Xlinker '$ORIGIN'";  // the targets of a configuration share a folder, wherever it is moved
@@ -136,16 +136,10 @@ std::string LinkCommand(const ProjectBuilder& builder, const std::string& target
   if (!isStatic) return std::string(compiler.link);
   const std::string command(compiler.archive);
   if (compiler.family != CompilerFamily::Gcc) return command;
-  return command + " \"" + AsInput(builder.settings, target) + "\"";
+  return command + " \"" + AsInput(builder.settings.compiler, target) + "\"";
 }
 
 }  // namespace
-
-std::string TargetPath(const ProjectBuilder& builder) {
-  const Project& project = builder.project;
-  if (IsGccFamily(builder.settings.compiler)) return GccTargetPath(project, builder.config);
-  return builder.LibraryDirectory() + "/" + project.name + "." + std::string(TargetTypeExtension(project.targetType));
-}
 
 std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   const Project& project = builder.project;
@@ -153,9 +147,9 @@ std::vector<std::string> CollectLinkInputs(ProjectBuilder& builder) {
   std::vector<std::string> inputs;
   for (const ScannedFile* file : builder.scanned) {
     if (HasObject(file->file)) {
-      inputs.push_back(ObjectPath(builder, file->file));
+      inputs.push_back(builder.paths.Object(file->file));
     } else if (file->file.kind == FileKind::Rc && !project.libraryIsStatic && !isGcc) {
-      inputs.push_back(ResourceObjectPath(builder, file->file));
+      inputs.push_back(builder.paths.ResourceObject(file->file));
     }
   }
   if (project.targetType == TargetType::StaticLibrary) return inputs;
@@ -192,110 +186,143 @@ void HintAtUnbuiltLibraries(const ProjectBuilder& builder) {
   }
 }
 
-}  // namespace
+// Linker or librarian; then, for those compilers, the manifest tool and a mark of the time of its update.
+class LinkStep : public BuildStep {
+ public:
+  LinkStep(ProjectBuilder& builder, std::string target, std::vector<std::string> inputs)
+      : m_builder(builder),
+        m_target(std::move(target)),
+        m_inputs(std::move(inputs)),
+        m_responseFile(builder.paths.Intermediate() + "/linker.rsp"),
+        m_manifestFile(builder.paths.Intermediate() + "/mt.rsp"),
+        m_batchFile(builder.paths.Intermediate() + "/mtdep.bat") {}
 
-namespace {
-
-std::string LinkerResponseFile(const ProjectBuilder& builder) {
-  return builder.IntermediateDirectory() + "/linker.rsp";
-}
-std::string ManifestResponseFile(const ProjectBuilder& builder) { return builder.IntermediateDirectory() + "/mt.rsp"; }
-std::string ManifestBatchFile(const ProjectBuilder& builder) { return builder.IntermediateDirectory() + "/mtdep.bat"; }
-
-}  // namespace
-
-// A target without its manifest must not pass for a good one.
-bool MakeTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
-  try {
-    ToolOutputs outputs(builder.settings, {target},
-                        {LinkerResponseFile(builder), ManifestResponseFile(builder), ManifestBatchFile(builder)});
-    if (!LinkTarget(builder, target, inputs)) return false;
-    if (CompilerOf(builder.settings.compiler).embedsManifest && !EmbedManifest(builder)) return false;
-    return outputs.Keep();
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
+  std::optional<Command> Prepare() override {
+    try {
+      switch (m_stage) {
+        case Stage::Link:
+          return PrepareLink();
+        case Stage::Manifest:
+          return PrepareManifest();
+        case Stage::Mark:
+          return PrepareMark();
+        case Stage::Over:
+          break;
+      }
+    } catch (const FileException& exception) {
+      TraceWriter() << "Error: " << exception << "\n";
+      Fail();
+    }
+    return std::nullopt;
   }
-  ++builder.errorCount;
-  return false;
-}
 
-bool LinkTarget(ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
-  const std::string responseFile = LinkerResponseFile(builder);
-  const bool isGcc = IsGccFamily(builder.settings.compiler);
-  if (!ToolsTake(builder, {target, responseFile})) return false;
-  const std::string text = isGcc ? GccLinkerText(builder, target, inputs) : VisualLinkerText(builder, inputs);
-  int returnCode = 0;
-  bool linked = false;
-  CreateDirectories(target, false);
+  void Finish(const CommandResult& result) override {
+    m_commandFile.reset();
+    if (!result.succeeded) {
+      if (m_stage != Stage::Link) return Fail();
+      TraceWriter() << m_responseFile << ": " << m_linkerText << "\n";
+      return FailLink();
+    }
+    if (m_stage == Stage::Manifest) {
+      m_stage = Stage::Mark;
+    } else if (m_stage == Stage::Link && EmbedsManifest()) {
+      m_stage = Stage::Manifest;
+    } else {
+      m_hasSucceeded = true;
+      m_outputs->Keep();
+      End();
+    }
+  }
+
+ private:
+  enum class Stage { Link, Manifest, Mark, Over };
+
+  bool EmbedsManifest() const {
+    return CompilerOf(m_builder.settings.compiler).embedsManifest &&
+           m_builder.project.targetType != TargetType::StaticLibrary;
+  }
+  void End() {
+    m_stage = Stage::Over;
+    m_outputs.reset();
+  }
+  void Fail() {
+    ++m_builder.errorCount;
+    End();
+  }
+  void FailLink() {
+    HintAtUnbuiltLibraries(m_builder);
+    Fail();
+  }
+  Command Checked(std::string line) const {
+    return {.line = std::move(line), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
+  }
+  std::optional<Command> PrepareLink();
+  std::optional<Command> PrepareManifest();
+  std::optional<Command> PrepareMark();
+
+  ProjectBuilder& m_builder;
+  const std::string m_target;
+  const std::vector<std::string> m_inputs;
+  const std::string m_responseFile, m_manifestFile, m_batchFile;
+  std::string m_linkerText;
+  Stage m_stage = Stage::Link;
+  std::optional<ToolOutputs> m_outputs;
+  std::optional<CommandFile> m_commandFile;
+};
+
+std::optional<Command> LinkStep::PrepareLink() {
+  m_outputs.emplace(m_builder.settings, std::vector{m_target},
+                    std::vector{m_responseFile, m_manifestFile, m_batchFile});
+  if (!ToolsTake(m_builder, {m_target, m_responseFile})) {
+    End();
+    return std::nullopt;
+  }
+  const bool isGcc = IsGccFamily(m_builder.settings.compiler);
+  m_linkerText = isGcc ? GccLinkerText(m_builder, m_target, m_inputs) : VisualLinkerText(m_builder, m_inputs);
+  CreateDirectories(m_target, false);
   try {
-    RemoveLink(target);
-    const CommandFile response(builder.settings.leftovers, responseFile, text);
+    RemoveLink(m_target);
+    m_commandFile.emplace(m_builder.settings.leftovers, m_responseFile, m_linkerText);
     TraceWriter() << "Linking...\n";
-    if (builder.settings.diagnostics) TraceWriter() << responseFile << " = " << text << "\n";
-    if (isGcc) DeleteFile(target);  // an archive would keep members of objects that are gone
-    CommandOptions options;
-    options.echo = builder.settings.diagnostics;
-    options.failOnNonZero = true;
-    linked = RunCommand(builder.settings.tools, LinkCommand(builder, target) + " @\"" + responseFile + "\"", returnCode,
-                        options);
-    if (!linked) TraceWriter() << responseFile << ": " << text << "\n";
+    if (m_builder.settings.diagnostics) TraceWriter() << m_responseFile << " = " << m_linkerText << "\n";
+    if (isGcc) DeleteFile(m_target);  // an archive would keep members of objects that are gone
   } catch (const FileException&) {
-    TraceWriter() << "Error writing " << text << " - linking failed\n";
+    m_commandFile.reset();
+    TraceWriter() << "Error writing " << m_linkerText << " - linking failed\n";
+    FailLink();
+    return std::nullopt;
   }
-  if (linked) return true;
-  HintAtUnbuiltLibraries(builder);
-  ++builder.errorCount;
-  return false;
+  return Checked(LinkCommand(m_builder, m_target) + " @\"" + m_responseFile + "\"");
 }
 
-// --- Manifest
-
-namespace {
-
-bool RunManifestCommand(const ProjectBuilder& builder, const std::string& command) {
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.failOnNonZero = true;
-  int returnCode;
-  return RunCommand(builder.settings.tools, command, returnCode, options);
-}
-
-bool UpdateManifest(const ProjectBuilder& builder) {
-  const Project& project = builder.project;
+std::optional<Command> LinkStep::PrepareManifest() {
+  const Project& project = m_builder.project;
   const bool isDll = project.targetType == TargetType::DynamicLinkLibrary;
   const bool isProgram =
       project.targetType == TargetType::Application || project.targetType == TargetType::ConsoleApplication;
   const std::string name = project.name + (isDll ? ".dll" : isProgram ? ".exe" : ".");
   const std::string_view resource = isDll ? "2" : isProgram ? "1" : "0";
-  const std::string directory = builder.IntermediateDirectory();
-  const std::string text = "/outputresource:\"" + builder.LibraryDirectory() + "/" + name + "\";#" +
-                           std::string(resource) + " /manifest \"./" + directory + "/" + name +
+  const std::string text = "/outputresource:\"" + m_builder.paths.Library() + "/" + name + "\";#" +
+                           std::string(resource) + " /manifest \"./" + m_builder.paths.Intermediate() + "/" + name +
                            ".intermediate.manifest\"\n";
-  const CommandFile response(builder.settings.leftovers, ManifestResponseFile(builder), text);
-  if (builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
-  return RunManifestCommand(builder, "mt.exe @\"" + response.Path() + "\" /nologo");
+  m_commandFile.emplace(m_builder.settings.leftovers, m_manifestFile, text);
+  if (m_builder.settings.diagnostics) TraceWriter() << "Embedding manifest...\n" << text;
+  return Checked("mt.exe @\"" + m_manifestFile + "\" /nologo");
 }
 
 // Leaves a mark of the last update beside the objects.
-bool MarkManifestTime(const ProjectBuilder& builder) {
+std::optional<Command> LinkStep::PrepareMark() {
   std::string directory;
-  ReplaceChar(builder.IntermediateDirectory(), directory, '/', '\\');
-  const CommandFile batch(builder.settings.leftovers, ManifestBatchFile(builder),
-                          "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
-  return RunManifestCommand(builder, "\"" + directory + "\\mtdep.bat\"");
+  ReplaceChar(m_builder.paths.Intermediate(), directory, '/', '\\');
+  m_commandFile.emplace(m_builder.settings.leftovers, m_batchFile,
+                        "@echo Manifest resource last updated at %TIME% on %DATE% >\"" + directory + "\\mt.dep\"\n");
+  return Checked("\"" + directory + "\\mtdep.bat\"");
 }
 
 }  // namespace
 
-bool EmbedManifest(ProjectBuilder& builder) {
-  if (builder.project.targetType == TargetType::StaticLibrary) return true;
-  try {
-    if (UpdateManifest(builder) && MarkManifestTime(builder)) return true;
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
-  }
-  ++builder.errorCount;
-  return false;
+std::unique_ptr<BuildStep> TargetStep(ProjectBuilder& builder, std::string target, std::vector<std::string> inputs) {
+  return std::make_unique<LinkStep>(builder, std::move(target), std::move(inputs));
 }
 
 }  // namespace qrex

@@ -16,72 +16,6 @@
 
 namespace qrex {
 
-std::string TranslationDirectory(const ProjectConfig& config) {
-  return "qrexsource/" + config.platform + "/" + config.name;
-}
-
-std::string DependencyFilePath(const Project& project, const ProjectConfig& config) {
-  return TranslationDirectory(config) + "/" + project.name + ".qrexdep";
-}
-
-ProjectBuilder::ProjectBuilder(ConfigSettings& settings, Project& project, ProjectConfig& config)
-    : settings(settings),
-      project(project),
-      config(config),
-      m_translationDirectory(TranslationDirectory(config)),
-      m_intermediateDirectory(config.platform + "/" + config.name + "/" + project.name) {}
-
-ProjectBuilder::~ProjectBuilder() = default;
-
-ScannedFile& ProjectBuilder::GetScannedFile(ProjectFile& file) {
-  std::unique_ptr<ScannedFile>& slot = scannedByPath[file.path];
-  if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
-  return *slot;
-}
-
-std::vector<const ScannedFile*> ProjectBuilder::FilesOfProject() const {
-  std::vector<const ScannedFile*> files;
-  for (const auto& [path, file] : scannedByPath) {
-    if (file->file.project == &project) files.push_back(file.get());
-  }
-  std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
-  return files;
-}
-
-bool ProjectBuilder::RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) {
-  const auto [entry, isNew] = m_guidOwners.emplace(id, owner);
-  if (!isNew) existingOwner = entry->second;
-  return isNew;
-}
-
-const ScannedFile* ProjectBuilder::FileOfPosition(const char* position) const {
-  const auto holds = [position](const ScannedFile& file) {
-    return file.translated && TextRange(std::string_view(file.sourceText)).Contains(position);
-  };
-  if (m_lastPositioned && holds(*m_lastPositioned)) return m_lastPositioned;  // messages come in runs
-  for (const auto& [name, file] : scannedByPath) {
-    if (holds(*file)) return m_lastPositioned = file.get();
-  }
-  return nullptr;
-}
-
-bool ProjectBuilder::FindSourcePosition(const char* position, std::string& path, int64_t& line) const {
-  const ScannedFile* const file = position ? FileOfPosition(position) : nullptr;
-  if (!file) return false;
-  path = file->SourcePath();
-  const auto table = m_lineStarts.try_emplace(file, TextRange(std::string_view(file->sourceText))).first;
-  line = table->second.LineOf(position);
-  return true;
-}
-
-std::string ProjectBuilder::TranslatedPath(const ProjectFile& file) const {
-  return PathJoin(m_translationDirectory, file.path);
-}
-
-std::string ProjectBuilder::LibraryDirectory() const {
-  return PathJoin3(settings.exportLib, config.platform, config.name);
-}
-
 void ProjectBuilder::WriteHeading(std::string_view end) const {
   TraceWriter() << "\n------------------------------------- " << project.name << "  [" << config.name << "|"
                 << config.platform << "] ------------------------------------------" << end;
@@ -95,19 +29,20 @@ bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile*
   WriteHeading("\n");
   if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
   PrepareFiles(dependencyFile);
-  bool result = true;
   try {
-    result = ProcessFiles(singleFile);
+    for (ScannedFile* file : scanned) ProcessFile(*file, singleFile);
+    scheduler.WaitForAll();
     if (!project.exported && isBuild) {
       ReportUnregistered();
-      if (!settings.translateOnly && result) result = LinkIfStale();
+      if (!settings.translateOnly && !m_hasFailed) LinkIfStale();
     }
+    scheduler.WaitForAll();
   } catch (const IException&) {
     Save(dependencyFile);
     throw;
   }
   Save(dependencyFile);
-  return result;
+  return !m_hasFailed;
 }
 
 void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
@@ -117,67 +52,57 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   } else if (!LoadDependencyFile(*this, dependencyFile) && settings.diagnostics) {
     TraceWriter() << "No dependency file " << dependencyFile << "\n";
   }
-  if (!settings.translateOnly) CreateDirectories(IntermediateDirectory(), true);
+  if (!settings.translateOnly) CreateDirectories(paths.Intermediate(), true);
   const size_t knownFiles = FileCount();
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (dependencyFileLoaded) ReadTimes();
   for (ScannedFile* file : scanned) {
     file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
     if (!file->needsWriting) continue;
-    hasStaleFiles = true;
+    m_hasStaleFiles = true;
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
-  if (dependencyFileLoaded && hasStaleFiles) FindTailHolders(*this, knownFiles);
+  if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, knownFiles);
 }
 
 // What the steps of an unchanged project ask for, at once: many files are waited for together.
 void ProjectBuilder::ReadTimes() {
-  std::vector<std::string> paths;
-  paths.reserve(3 * scanned.size());
+  std::vector<std::string> asked;
+  asked.reserve(3 * scanned.size());
   for (const ScannedFile* file : scanned) {
-    paths.push_back(file->SourcePath());
-    paths.push_back(TranslatedPath(*file));
+    asked.push_back(file->SourcePath());
+    asked.push_back(paths.Translated(file->file));
   }
   if (RunsTools()) {
     for (const ScannedFile* file : scanned) {
-      if (HasObject(file->file)) paths.push_back(ObjectPath(*this, file->file));
+      if (HasObject(file->file)) asked.push_back(paths.Object(file->file));
     }
   }
-  const std::vector<int64_t> found = LastWriteTimes(paths);
+  const std::vector<int64_t> found = LastWriteTimes(asked);
   size_t at = 0;
   for (ScannedFile* file : scanned) {
-    file->sourceTime = found[at++];
-    file->targetTime = found[at++];
+    file->times.source = found[at++];
+    file->times.target = found[at++];
   }
-  for (; at < paths.size(); ++at) m_objectTimes.emplace(std::move(paths[at]), found[at]);
+  for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
 }
 
-bool ProjectBuilder::ProcessFiles(const ProjectFile* singleFile) {
-  bool result = true;
-  for (ScannedFile* file : scanned) {
-    if (!ProcessFile(*file, singleFile)) result = false;
-  }
-  return result;
-}
-
-bool ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
+void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
   const FileKind kind = file.file.kind;
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
-  bool result = true;
-  if (file.file.isMainSource && (registerMap.dirty || unregisterMap.dirty)) file.needsWriting = true;
-  if (kind == FileKind::Cpp && isWritten && hasStaleFiles && !file.needsWriting && !file.translated) {
-    file.needsWriting = TailsMoved(file);
+  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file);
+  if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
+    if (TailsMoved(file)) WriteAgain(file);
   }
-  if (file.needsWriting && (kind == FileKind::H || isWritten)) BringUpToDate(file);
-  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.translationTime == 0) LearnNames(file);
+  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten)) BringUpToDate(file);
+  if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.times.translation == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
-    result = CompileResourceIfStale(file);
+    CompileResourceIfStale(file);
   }
-  if (RunsTools() && HasObject(file.file) && isWanted) result = CompileIfStale(file);
-  if (kind == FileKind::Cpp && !file.translated) MarkRegistered(file);
-  return result;
+  if (RunsTools() && HasObject(file.file) && isWanted) CompileIfStale(file);
+  if (kind == FileKind::Cpp && !file.HasBegunInPass()) MarkRegistered(file);
 }
 
 // What no run has translated registers something or not: the main source, which is to be compiled alone, has to know.
@@ -188,23 +113,34 @@ void ProjectBuilder::LearnNames(ScannedFile& file) {
   file.needsWriting = needsWriting;
 }
 
-bool ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
-  const int64_t resourceTime = LastWriteTime(ResourceObjectPath(*this, file.file));
-  if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return true;
-  return CompileResource(*this, file);
+void ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
+  const int64_t resourceTime = LastWriteTime(paths.ResourceObject(file.file));
+  if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return;
+  scheduler.Add(ResourceStep(*this, file), [this](bool succeeded) { m_hasFailed = m_hasFailed || !succeeded; });
 }
 
-bool ProjectBuilder::CompileIfStale(ScannedFile& file) {
-  const std::string object = ObjectPath(*this, file.file);
-  const auto [known, isNew] = m_objectTimes.try_emplace(object);
-  int64_t& objectTime = known->second;
-  if (isNew) objectTime = times.LastWriteTime(object);
-  if (LatestTargetTime(*this, file) < objectTime && !LiesAhead(*this, objectTime)) return true;
+void ProjectBuilder::CompileIfStale(ScannedFile& file) {
+  const std::string path = paths.Object(file.file);
+  const auto [known, isNew] = m_objects.try_emplace(path);
+  Object& object = known->second;
+  if (!object.source) object.source = &file.file;
+  if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
+  if (isNew) object.time = times.LastWriteTime(path);
+  if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
   BringUpToDate(file);
-  const bool compiled = file.file.kind == FileKind::Asm ? AssembleFile(*this, file) : CompileFile(*this, file);
-  objectTime = times.LastWriteTime(object);
-  settings.made.insert(object);
-  return compiled;
+  scheduler.Add(ObjectStep(*this, file), [this, path, &object](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    object.time = times.LastWriteTime(path);
+    settings.made.insert(path);
+  });
+}
+
+// One of them would take the other's place in the target.
+void ProjectBuilder::ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other) {
+  TraceWriter() << "ERROR: No object can be made of " << file.path << " : " << path << " is that of " << other.path
+                << "\n";
+  ++errorCount;
+  m_hasFailed = true;
 }
 
 namespace {
@@ -222,21 +158,22 @@ std::string HowToRegister(const ScannedFile& header) {
 
 void ProjectBuilder::ReportUnregistered() const {
   for (const ScannedFile* file : scanned) {
-    if (!file->hasDeclarations || file->registered) continue;
-    TraceWriter() << file->SourcePath() << "(1) : error : No cpp directly imports " << file->file.name
-                  << " - declarations not registered\n"
-                  << Hint(HowToRegister(*file));
+    if (!file->hasDeclarations || file->tail.isRegistered) continue;
+    settings.Tell(Message(Severity::Error,
+                          "error : ", "No cpp directly imports " + file->file.name + " - declarations not registered")
+                      .At({file->SourcePath(), 1})
+                      .WithHint(HowToRegister(*file)));
   }
 }
 
-bool ProjectBuilder::LinkIfStale() {
-  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return true;  // no target
-  const std::string target = TargetPath(*this);
+void ProjectBuilder::LinkIfStale() {
+  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return;  // no target
+  const std::string target = paths.Target();
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
   auto timeOf = [&](const std::string& input) {
-    const auto known = m_objectTimes.find(input);
-    return known == m_objectTimes.end() ? LastWriteTime(input) : known->second;
+    const auto known = m_objects.find(input);
+    return known == m_objects.end() ? LastWriteTime(input) : known->second.time;
   };
   std::vector<std::string> watched = LibrariesOfSwitches(*this);
   watched.insert(watched.end(), inputs.begin(), inputs.end());
@@ -245,20 +182,21 @@ bool ProjectBuilder::LinkIfStale() {
     return time > targetTime || (time == targetTime && settings.made.contains(input));
   };
   const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), isLater);
-  if (isCurrent && !LiesAhead(*this, targetTime)) return true;
-  if (!MakeTarget(*this, target, inputs)) return false;
-  settings.made.insert(target);
-  return true;
+  if (isCurrent && !LiesAhead(*this, targetTime)) return;
+  scheduler.Add(TargetStep(*this, target, inputs), [this, target](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    if (succeeded) settings.made.insert(target);
+  });
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
 void ProjectBuilder::Save(const std::string& dependencyFile) {
   if (registerMap.dirty || unregisterMap.dirty) {
     for (ScannedFile* file : scanned) {
-      if (file->file.isMainSource && (!file->translated || file->needsWriting)) file->translationTime = 0;
+      if (file->file.isMainSource && (!file->HasBegun() || file->needsWriting)) file->times.translation = 0;
     }
   }
-  if (hasStaleFiles) ForgetUnsettledTails(*this);
+  if (m_hasStaleFiles) ForgetUnsettledTails(*this);
   SaveDependencyFile(*this, dependencyFile);
 }
 
@@ -269,7 +207,7 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
     if (!DeleteReporting(path)) ++errorCount;
   };
   remove(dependencyFile);
-  for (const ProjectFile* file : project.files) remove(TranslatedPath(*file));
+  for (const ProjectFile* file : project.files) remove(paths.Translated(*file));
 }
 
 namespace {

@@ -1,97 +1,61 @@
-// One project in one configuration, from its file list to its target. Owns every ScannedFile that it meets, imported
-// files of other projects included.
+// One project in one configuration, from its file list to its target.
 #pragma once
 
 #include <cstdint>
-#include <map>
-#include <memory>
 #include <string>
+#include <string_view>
 #include <unordered_map>
 #include <vector>
 
-#include "text/files.h"
-#include "translator/symbols/scanned_file.h"
-#include "workspace/workspace.h"
+#include "builder/build_files.h"
+#include "builder/scheduler.h"
 
 namespace qrex {
 
-class ProjectBuilder : public TranslationHost {
+class ProjectBuilder : public BuildFiles {
  public:
-  ProjectBuilder(ConfigSettings& settings, Project& project, ProjectConfig& config);
-  ~ProjectBuilder() override;
+  using BuildFiles::BuildFiles;
 
   // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
   // An exception of the translation goes on to the caller; what was finished before it is kept.
   bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
+  // Behind a Build: translates again what follows from these files, whose texts have changed since, and no other. What
+  // they and all that import them had declared is taken back. A pass that ends early, by an exception, is made good by
+  // the next one.
+  void TranslateAgain(const std::vector<ProjectFile*>& changed);
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
-  // --- TranslationHost
-  const ConfigSettings& Settings() const override { return settings; }
-  const ProjectConfig& Config() const override { return config; }
-  ProjectFile* FindFile(const std::string& path) const override { return project.workspace->FindFile(path); }
-  ScannedFile& GetScannedFile(ProjectFile& file) override;
-  std::string TranslatedPath(const ScannedFile& file) const override { return TranslatedPath(file.file); }
-  bool RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) override;
-  DeclarationRegistry& RegisterMap() override { return registerMap; }
-  DeclarationRegistry& UnregisterMap() override { return unregisterMap; }
-  SymbolIndex& Symbols() override { return m_symbols; }
-  size_t NextFileIndex() override { return m_nextFileIndex++; }
-  size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
-  std::vector<const ScannedFile*> FilesOfProject() const override;
-  void CountWarning() override { ++warningCount; }
-  bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const override;
-
-  // --- Paths
-  std::string TranslatedPath(const ProjectFile& file) const;
-  const std::string& IntermediateDirectory() const { return m_intermediateDirectory; }
-  std::string LibraryDirectory() const;
-
-  ConfigSettings& settings;
-  Project& project;
-  ProjectConfig& config;
-  DeclarationRegistry registerMap{true};
-  DeclarationRegistry unregisterMap{false};
-  std::vector<ScannedFile*> scanned;  // of project.files, in their order
-
- private:
-  SymbolIndex m_symbols;  // ahead of the files, whose name spaces refer to it
-
- public:
-  std::unordered_map<std::string_view, std::unique_ptr<ScannedFile>> scannedByPath;
-  FileTimes times;
-  bool dependencyFileLoaded = false;
-  bool hasStaleFiles = false;  // as judged from the dependency file and the times
   int64_t errorCount = 0;
-  int64_t warningCount = 0;
+  Scheduler scheduler{settings.tools, 1};
 
  private:
+  struct Object {
+    int64_t time = 0;
+    const ProjectFile* source = nullptr;
+  };
+
   void WriteHeading(std::string_view end) const;
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
-  bool ProcessFiles(const ProjectFile* singleFile);
-  bool ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
+  void ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
+  void BeginPass(const std::vector<ProjectFile*>& changed);
+  bool RegistriesMoved();              // asked for the main source, behind all that could settle them
+  void WriteAgain(ScannedFile& file);  // though it was translated in an earlier pass
   void LearnNames(ScannedFile& file);
-  bool CompileResourceIfStale(ScannedFile& file);
-  bool CompileIfStale(ScannedFile& file);
+  void CompileResourceIfStale(ScannedFile& file);
+  void CompileIfStale(ScannedFile& file);
+  void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
-  bool LinkIfStale();
-  const ScannedFile* FileOfPosition(const char* position) const;  // whose source text holds it; or null
+  void LinkIfStale();
   void Save(const std::string& dependencyFile);
 
-  const std::string m_translationDirectory, m_intermediateDirectory;
-  std::map<guid, std::string> m_guidOwners;
-  std::unordered_map<std::string, int64_t> m_objectTimes;  // as the compile steps know them
-  size_t m_nextFileIndex = 0;
-  mutable const ScannedFile* m_lastPositioned = nullptr;
-  mutable std::unordered_map<const ScannedFile*, LineStarts> m_lineStarts;  // of those that messages were about
+  std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
+  bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
+  bool m_hasFailed = false;                           // a step has
 };
 
 // Copies what is outside the project's `src` folder to the export directories, translated and as it is.
 void ExportPublicHeaders(Project& project, ProjectConfig& config);
-
-// qrexsource/PLATFORM/CONFIG, and the dependency file of a project there.
-std::string TranslationDirectory(const ProjectConfig& config);
-std::string DependencyFilePath(const Project& project, const ProjectConfig& config);
 
 }  // namespace qrex

@@ -9,7 +9,7 @@ namespace {
 // Goes through the files as a build that translates them all, and deals out the tails as it would.
 class TailWalk {
  public:
-  TailWalk(const ProjectBuilder& builder, size_t knownFiles)
+  TailWalk(const BuildFiles& builder, size_t knownFiles)
       : m_builder(builder), m_knownFiles(knownFiles), m_visited(builder.FileCount()), m_holders(builder.FileCount()) {
     for (ScannedFile* file : builder.scanned) Visit(*file);
   }
@@ -38,7 +38,7 @@ class TailWalk {
     return found != m_builder.scannedByPath.end() && found->second->index < m_knownFiles;
   }
 
-  const ProjectBuilder& m_builder;
+  const BuildFiles& m_builder;
   const size_t m_knownFiles;
   std::vector<bool> m_visited;
   std::vector<ScannedFile*> m_holders;
@@ -54,33 +54,33 @@ bool HasTail(ScannedFile& header) {
 
 }  // namespace
 
-void FindTailHolders(ProjectBuilder& builder, size_t knownFiles) {
+void FindTailHolders(BuildFiles& builder, size_t knownFiles) {
   const TailWalk walk(builder, knownFiles);
-  for (const auto& [path, file] : builder.scannedByPath) file->tailHolder = walk.HolderOf(*file);
+  for (const auto& [path, file] : builder.scannedByPath) file->tail.holder = walk.HolderOf(*file);
 }
 
 bool TailsMoved(ScannedFile& file) {
-  if (file.lostTail) return true;
+  if (file.tail.isLost) return true;
   for (ScannedFile* import : file.imports) {
     if (import->file.kind == FileKind::Cpp) continue;
-    const bool holds = import->tailHolder == &file;
-    const bool takes = !import->registered && MayHoldTail(file.file, import->file);
+    const bool holds = import->tail.holder == &file;
+    const bool takes = !import->tail.isRegistered && MayHoldTail(file.file, import->file);
     if (holds == takes) continue;
     if (HasTail(*import)) return true;
-    if (takes) import->tailHolder = &file;
+    if (takes) import->tail.holder = &file;
   }
   return false;
 }
 
-void ForgetUnsettledTails(ProjectBuilder& builder) {
+void ForgetUnsettledTails(BuildFiles& builder) {
   const TailWalk walk(builder, builder.FileCount());
   for (const auto& [path, file] : builder.scannedByPath) {
-    if (file->lostTail) file->translationTime = 0;
+    if (file->tail.isLost) file->times.translation = 0;
     ScannedFile* const holder = walk.HolderOf(*file);
-    const bool hasNone = file->translated && !file->HasTail();
-    if (holder == file->tailHolder || hasNone) continue;
-    if (holder) holder->translationTime = 0;
-    if (file->tailHolder) file->tailHolder->translationTime = 0;
+    const bool hasNone = file->HasBegun() && !file->HasTail();
+    if (holder == file->tail.holder || hasNone) continue;
+    if (holder) holder->times.translation = 0;
+    if (file->tail.holder) file->tail.holder->times.translation = 0;
   }
 }
 

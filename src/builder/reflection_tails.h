@@ -7,17 +7,17 @@
 // outputs agree with these. Whatever does not agree when they are saved is stale in the next run.
 #pragma once
 
-#include "builder/project_builder.h"
+#include "builder/build_files.h"
 
 namespace qrex {
 
 // Sets the `tailHolder` of each file as the last run left the outputs. The first so many files stood in the dependency
 // file; a .cpp that did not was no header's own in that run.
-void FindTailHolders(ProjectBuilder& builder, size_t knownFiles);
+void FindTailHolders(BuildFiles& builder, size_t knownFiles);
 // Whether a .cpp that is not translated yet holds other tails than it would if it was written now.
 bool TailsMoved(ScannedFile& file);
 // Gives translation time 0 to each .cpp whose output does not agree with the imports as they are about to be saved: the
 // run ended early, or wrote one file only.
-void ForgetUnsettledTails(ProjectBuilder& builder);
+void ForgetUnsettledTails(BuildFiles& builder);
 
 }  // namespace qrex

@@ -13,33 +13,27 @@ namespace {
 constexpr char kOutputFile[] = "out1.txt";
 constexpr char kErrorFile[] = "out2.txt";
 
-// What the interpreter answers when no tool did.
-constexpr int kNotExecutable = 126;
-constexpr int kNotFound = 127;
-constexpr int kEndedBySignal = 128;  // plus the signal
-constexpr int kLastSignal = 64;
-constexpr int kInterrupt = 2, kQuit = 3;
-
-void ReportNoInterpreter(platform::NoInterpreter cause) {
-  using platform::NoInterpreter;
+void ReportNoInterpreter(platform::ProcessEnd::StartFailure failure) {
+  using Failure = platform::ProcessEnd::StartFailure;
   TraceWriter trace;
   trace << "ERROR running command interpreter\n";
-  switch (cause) {
-    case NoInterpreter::NotFound:
+  switch (failure) {
+    case Failure::NotFound:
       trace << "Command interpreter cannot be found\n";
       break;
-    case NoInterpreter::LineTooLong:
+    case Failure::TooLong:
       trace << "Argument List is too big\n";
       break;
-    case NoInterpreter::NotAProgram:
+    case Failure::BadFormat:
       trace << "Command-interpreter file has invalid format and is not executable\n";
       break;
-    case NoInterpreter::NoMemory:
+    case Failure::NoMemory:
       trace << "Not enough memory is available to execute command;\n"
                "or available memory has been corrupted; or invalid block exists,\n"
                "indicating that process making call was not allocated properly.\n";
       break;
-    case NoInterpreter::OtherCause:
+    case Failure::None:
+    case Failure::Other:
       break;
   }
 }
@@ -50,78 +44,84 @@ std::string_view ToolOf(std::string_view command) {
   return command.substr(0, command.find(' '));
 }
 
-void ReportAbnormalEnd(std::string_view command, int returnCode) {
+void ReportAbnormalEnd(std::string_view command, const platform::ProcessEnd& end) {
+  using Cause = platform::ProcessEnd::Cause;
   TraceWriter trace;
   trace << "ERROR: " << ToolOf(command);
-  if (returnCode == kNotFound) {
+  if (end.cause == Cause::NotFound) {
     trace << " was not found on PATH\n";
-  } else if (returnCode == kNotExecutable) {
+  } else if (end.cause == Cause::NotExecutable) {
     trace << " cannot be executed\n";
   } else {
-    trace << " was ended by signal " << returnCode - kEndedBySignal << "\n";
+    trace << " was ended by signal " << end.code << "\n";
   }
 }
 
-// Reads a capture file and deletes it.
-bool TakeCapture(const char* path, std::string& text) {
-  if (!LoadText(text, path, true)) return false;
-  DeleteFile(path);
+// As the interpreter would be told to capture: what is printed comes through pipes, and the files are left out.
+std::string LineOf(const Command& command) {
+  std::string line = command.line;
+  if (command.capturesOutput) line += std::string(" 1>") + kOutputFile;
+  if (command.errorsIntoOutput) line += " 2>&1";
+  if (command.capturesErrors) line += std::string(" 2>") + kErrorFile;
+  return line;
+}
+
+bool TakeCaptured(platform::CapturedText& captured, std::string& text) {
+  std::optional<std::string> whole = captured.Take();
+  if (!whole) return false;
+  FoldLineEnds(*whole);
+  text = std::move(*whole);
   return true;
 }
 
 }  // namespace
 
-bool IsAbnormalEnd(int returnCode) {
-  return returnCode == kNotExecutable || returnCode == kNotFound ||
-         (returnCode > kEndedBySignal && returnCode <= kEndedBySignal + kLastSignal);
+platform::Processes::Id StartCommand(platform::Processes& tools, const Command& command) {
+  using Stream = platform::Program::Stream;
+  // What bears these names is left of a run that needed them.
+  if (command.capturesOutput) DeleteThoughReadOnly(kOutputFile);
+  if (command.capturesErrors) DeleteThoughReadOnly(kErrorFile);
+  if (command.echo) TraceWriter() << LineOf(command) << "\n";
+  return tools.Start({.line = command.line,
+                      .output = command.capturesOutput ? Stream::Captured : Stream::Inherited,
+                      .errors = command.capturesErrors ? Stream::Captured : Stream::Inherited,
+                      .errorsIntoOutput = command.errorsIntoOutput});
 }
 
-bool RunCommand(platform::ToolKeeper& tools, const std::string& command, int& returnCode,
-                const CommandOptions& options) {
-  std::string line = command;
-  if (options.output) {
-    line += std::string(" 1>") + kOutputFile;
-    DeleteThoughReadOnly(kOutputFile);  // what an earlier run may have left is not this tool's
-  }
-  if (options.errorsIntoOutput) line += " 2>&1";
-  if (options.errors) {
-    line += std::string(" 2>") + kErrorFile;
-    DeleteThoughReadOnly(kErrorFile);
-  }
-  if (options.echo) TraceWriter() << line << "\n";
+CommandResult EndCommand(const Command& command, platform::Processes::Ended ended) {
+  CommandResult result;
+  result.end = ended.end;
   auto fail = [&](std::string_view message) {
-    if (!options.echo) TraceWriter() << line << "\n";
+    if (!command.echo) TraceWriter() << LineOf(command) << "\n";
     TraceWriter() << message;
-    return false;
+    return result;
   };
 
-  returnCode = platform::RunCommand(tools, line);
-  if (returnCode == -1) {
-    const platform::NoInterpreter cause = platform::WhyNoInterpreter();
+  if (ended.end.cause == platform::ProcessEnd::Cause::NotStarted) {
     fail("");
-    ReportNoInterpreter(cause);
-    return false;
+    ReportNoInterpreter(ended.end.failure);
+    return result;
   }
-  if (returnCode == kEndedBySignal + kInterrupt || returnCode == kEndedBySignal + kQuit) {
-    if (options.output) DeleteFile(kOutputFile);
-    if (options.errors) DeleteFile(kErrorFile);
-    throw LexScannerException("Interrupted while running " + std::string(ToolOf(command)), nullptr);
+  if (ended.end.IsInterrupt()) {
+    throw LexScannerException("Interrupted while running " + std::string(ToolOf(command.line)), nullptr);
   }
-  if (IsAbnormalEnd(returnCode)) ReportAbnormalEnd(command, returnCode);
-  if (returnCode != 0 && options.failOnNonZero) return fail("Return code : " + std::to_string(returnCode) + "\n");
-  if (options.output && !TakeCapture(kOutputFile, *options.output)) return fail("ERROR getting stdout\n");
-  if (options.errors && !TakeCapture(kErrorFile, *options.errors)) return fail("ERROR getting stderr\n");
-  if (options.errors && !options.errors->empty()) {
-    if (options.failOnErrorText) return fail(*options.errors + "\n");
-    TraceWriter() << *options.errors << "\n";
+  if (!ended.end.IsNormal()) ReportAbnormalEnd(command.line, ended.end);
+  if (result.ReturnCode() != 0 && command.failOnNonZero) {
+    return fail("Return code : " + std::to_string(result.ReturnCode()) + "\n");
   }
-  return true;
+  if (command.capturesOutput && !TakeCaptured(ended.output, result.output)) return fail("ERROR getting stdout\n");
+  if (command.capturesErrors && !TakeCaptured(ended.errors, result.errors)) return fail("ERROR getting stderr\n");
+  if (!result.errors.empty()) {
+    if (command.failOnErrorText) return fail(result.errors + "\n");
+    TraceWriter() << result.errors << "\n";
+  }
+  result.succeeded = true;
+  return result;
 }
 
 ToolOutputs::ToolOutputs(const ConfigSettings& settings, std::vector<std::string> outputs,
                          std::vector<std::string> passing)
     : m_settings(settings), m_outputs(std::move(outputs)), m_noted(std::move(passing)) {
-  m_noted.insert(m_noted.end(), {kOutputFile, kErrorFile});
   m_noted.insert(m_noted.end(), m_outputs.begin(), m_outputs.end());
   m_settings.outputNotes.Add(m_settings.leftovers, m_noted);
 }

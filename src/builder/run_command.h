@@ -1,6 +1,7 @@
-// Starting a tool through the command interpreter.
+// Starting a tool through the command interpreter, and what is said of how it ended.
 #pragma once
 
+#include <optional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -10,22 +11,26 @@
 
 namespace qrex {
 
-struct CommandOptions {
+struct Command {
+  std::string line;
   bool echo = false;
-  std::string* output = nullptr;  // where the captured standard output goes; null: not captured
-  std::string* errors = nullptr;
+  bool capturesOutput = false;
+  bool capturesErrors = false;
   bool errorsIntoOutput = false;  // the error stream joins the captured output
   bool failOnNonZero = false;
   bool failOnErrorText = false;
 };
 
-// False when the command could not be run or failed as the options say; the trace log says why. `returnCode` is the
-// interpreter's. Throws a LexScannerException when the user interrupted the tool: that ends the run.
-bool RunCommand(platform::ToolKeeper& tools, const std::string& command, int& returnCode,
-                const CommandOptions& options);
+struct CommandResult {
+  bool succeeded = false;  // else it could not be run, or failed as the command says; the trace log has told why
+  platform::ProcessEnd end;
+  std::string output, errors;  // as captured
+  int ReturnCode() const { return end.InterpreterCode(); }
+};
 
-// True of a code that no tool chose: the interpreter could not start it, or a signal ended it.
-bool IsAbnormalEnd(int returnCode);
+platform::Processes::Id StartCommand(platform::Processes& tools, const Command& command);
+// Throws a LexScannerException when the user interrupted the tool: that ends the run.
+CommandResult EndCommand(const Command& command, platform::Processes::Ended ended);
 
 // What a tool writes, from ahead of its start until it is known to be whole: on any other way out, and in the next run
 // if this one is killed, it is deleted, so that no half of it passes for good.
@@ -37,7 +42,7 @@ class ToolOutputs {
   ToolOutputs(const ToolOutputs&) = delete;
   ToolOutputs& operator=(const ToolOutputs&) = delete;
 
-  bool Keep() { return m_areWhole = true; }
+  void Keep() { m_areWhole = true; }
 
  private:
   const ConfigSettings& m_settings;

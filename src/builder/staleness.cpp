@@ -16,61 +16,61 @@ void RequireStack(const ScannedFile& file) {
 }  // namespace
 
 // The cache is set ahead of the imports, so that a cycle in a dependency file ends here.
-int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file) {
-  if (file.latestSourceTime != 0) return file.latestSourceTime;
+int64_t LatestSourceTime(BuildFiles& builder, ScannedFile& file) {
+  if (file.times.latestSource != 0) return file.times.latestSource;
   RequireStack(file);
-  file.latestSourceTime = file.sourceTime != 0 ? file.sourceTime : builder.times.LastWriteTime(file.SourcePath());
-  if (file.latestSourceTime == 0) return 0;
+  file.times.latestSource = file.times.source != 0 ? file.times.source : builder.times.LastWriteTime(file.SourcePath());
+  if (file.times.latestSource == 0) return 0;
   for (ScannedFile* import : file.imports) {
     const int64_t time = LatestSourceTime(builder, *import);
-    if (time == 0) return file.latestSourceTime = 0;
-    file.latestSourceTime = std::max(file.latestSourceTime, time);
+    if (time == 0) return file.times.latestSource = 0;
+    file.times.latestSource = std::max(file.times.latestSource, time);
   }
-  return file.latestSourceTime;
+  return file.times.latestSource;
 }
 
 namespace {
 
-int64_t TargetTime(ProjectBuilder& builder, ScannedFile& file) {
-  if (file.targetTime == 0) file.targetTime = builder.times.LastWriteTime(builder.TranslatedPath(file));
-  return file.targetTime;
+int64_t TargetTime(BuildFiles& builder, ScannedFile& file) {
+  if (file.times.target == 0) file.times.target = builder.times.LastWriteTime(builder.paths.Translated(file.file));
+  return file.times.target;
 }
 
 }  // namespace
 
-int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer) {
-  if (file.latestTargetTime != 0) return file.latestTargetTime;
+int64_t LatestTargetTime(BuildFiles& builder, ScannedFile& file, const ScannedFile* importer) {
+  if (file.times.latestTarget != 0) return file.times.latestTarget;
   RequireStack(file);
-  file.latestTargetTime = TargetTime(builder, file);
-  if (file.latestTargetTime == 0) {
+  file.times.latestTarget = TargetTime(builder, file);
+  if (file.times.latestTarget == 0) {
     throw LexScannerException("Error - file not translated by qrex : " + file.file.path, nullptr)
         .WithHint(importer ? importer->UseHint(file) : std::string());
   }
   for (ScannedFile* import : file.imports) {
-    file.latestTargetTime = std::max(file.latestTargetTime, LatestTargetTime(builder, *import, &file));
+    file.times.latestTarget = std::max(file.times.latestTarget, LatestTargetTime(builder, *import, &file));
   }
-  return file.latestTargetTime;
+  return file.times.latestTarget;
 }
 
-bool LiesAhead(const ProjectBuilder& builder, int64_t time) {
+bool LiesAhead(const BuildFiles& builder, int64_t time) {
   return time > builder.settings.begun && time > platform::SystemFileTime();
 }
 
-bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file) {
+bool NeedsTranslation(BuildFiles& builder, ScannedFile& file) {
   if (TargetTime(builder, file) == 0) return true;
   const int64_t sourceTime = LatestSourceTime(builder, file);
-  return sourceTime == 0 || sourceTime >= file.translationTime || LiesAhead(builder, file.translationTime);
+  return sourceTime == 0 || sourceTime >= file.times.translation || LiesAhead(builder, file.times.translation);
 }
 
 void MarkRegistered(ScannedFile& file) {
   for (ScannedFile* import : file.imports) {
-    if (import->tailHolder == &file) import->registered = true;
+    if (import->tail.holder == &file) import->tail.isRegistered = true;
   }
-  if (file.registered) return;
+  if (file.tail.isRegistered) return;
   for (ScannedFile* import : file.imports) {
-    if (MayHoldTail(file.file, import->file)) import->registered = true;
+    if (MayHoldTail(file.file, import->file)) import->tail.isRegistered = true;
   }
-  file.registered = true;
+  file.tail.isRegistered = true;
 }
 
 }  // namespace qrex

@@ -3,17 +3,17 @@
 
 #include <cstdint>
 
-#include "builder/project_builder.h"
+#include "builder/build_files.h"
 
 namespace qrex {
 
 // The latest write time of the file and all that it imports; 0 if one of them is missing. Kept in the ScannedFile.
-int64_t LatestSourceTime(ProjectBuilder& builder, ScannedFile& file);
+int64_t LatestSourceTime(BuildFiles& builder, ScannedFile& file);
 // The same over the translated files. Throws "Error - file not translated by qrex : ", whose hint tells the importer.
-int64_t LatestTargetTime(ProjectBuilder& builder, ScannedFile& file, const ScannedFile* importer = nullptr);
+int64_t LatestTargetTime(BuildFiles& builder, ScannedFile& file, const ScannedFile* importer = nullptr);
 // A time that is still to come tells nothing of what is younger: the clock was ahead when the file was made.
-bool LiesAhead(const ProjectBuilder& builder, int64_t time);
-bool NeedsTranslation(ProjectBuilder& builder, ScannedFile& file);
+bool LiesAhead(const BuildFiles& builder, int64_t time);
+bool NeedsTranslation(BuildFiles& builder, ScannedFile& file);
 // Notes that a .cpp which was not translated in this run registers the headers of its project that it imports directly.
 void MarkRegistered(ScannedFile& file);
 

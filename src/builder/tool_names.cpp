@@ -4,9 +4,9 @@
 
 namespace qrex {
 
-std::string Quoted(const ConfigSettings& settings, std::string_view name) {
+std::string Quoted(CompilerKind compiler, std::string_view name) {
   std::string text(name);
-  if (IsGccFamily(settings.compiler)) ReplaceAllInPlace(text, "\\", "\\\\");
+  if (IsGccFamily(compiler)) ReplaceAllInPlace(text, "\\", "\\\\");
   return "\"" + text + "\"";
 }
 
@@ -26,12 +26,12 @@ std::string_view TroubleWith(CompilerKind compiler, std::string_view path) {
 
 }  // namespace
 
-std::string AsInput(const ConfigSettings& settings, const std::string& path) {
-  return IsGccFamily(settings.compiler) && BeginsAnOption(path) ? "./" + path : path;
+std::string AsInput(CompilerKind compiler, const std::string& path) {
+  return IsGccFamily(compiler) && BeginsAnOption(path) ? "./" + path : path;
 }
 
-std::string QuotedInput(const ConfigSettings& settings, const std::string& path) {
-  return Quoted(settings, AsInput(settings, path));
+std::string QuotedInput(CompilerKind compiler, const std::string& path) {
+  return Quoted(compiler, AsInput(compiler, path));
 }
 
 bool ToolsTake(ProjectBuilder& builder, std::initializer_list<std::string_view> paths) {

@@ -11,10 +11,10 @@
 namespace qrex {
 
 // In double quotes, for a response file. GNU tools take `\` for an escape.
-std::string Quoted(const ConfigSettings& settings, std::string_view name);
+std::string Quoted(CompilerKind compiler, std::string_view name);
 // A path that is a word of its own: GNU tools must not take it for an option or for a response file.
-std::string AsInput(const ConfigSettings& settings, const std::string& path);
-std::string QuotedInput(const ConfigSettings& settings, const std::string& path);
+std::string AsInput(CompilerKind compiler, const std::string& path);
+std::string QuotedInput(CompilerKind compiler, const std::string& path);
 
 // False for a path that the tools of the compiler cannot be given: an error that names it is counted.
 bool ToolsTake(ProjectBuilder& builder, std::initializer_list<std::string_view> paths);

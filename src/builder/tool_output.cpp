@@ -34,19 +34,19 @@ struct Message {
 
 class OutputScanner {
  public:
-  explicit OutputScanner(ProjectBuilder& builder) : m_builder(builder) {
+  explicit OutputScanner(const BuildFiles& builder) : m_builder(builder) {
     FullPathOf(".", m_currentDirectory);
     if (!m_currentDirectory.ends_with('/')) m_currentDirectory += '/';
   }
 
-  bool Scan(std::string_view text) {
+  ToolMessages Scan(std::string_view text) {
     while (!text.empty()) {
       const size_t end = std::min(text.find('\n'), text.size());
       ScanLine(text.substr(0, end));
       m_trace << text.substr(0, end) << (end < text.size() ? "\n" : "");
       text.remove_prefix(std::min(end + 1, text.size()));
     }
-    return m_result;
+    return m_found;
   }
 
  private:
@@ -102,10 +102,9 @@ class OutputScanner {
 
   void Count(std::string_view rest) {
     if (StartsWith(rest, "error")) {
-      ++m_builder.errorCount;
-      m_result = false;
+      ++m_found.errors;
     } else if (StartsWith(rest, "warn")) {
-      ++m_builder.warningCount;
+      ++m_found.warnings;
     }
   }
 
@@ -128,14 +127,16 @@ class OutputScanner {
     m_trace << indentation << path << "(" << line << ") ...\n";
   }
 
-  ProjectBuilder& m_builder;
+  const BuildFiles& m_builder;
   std::string m_currentDirectory;  // with a slash at the end
   TraceWriter m_trace;
-  bool m_result = true;
+  ToolMessages m_found;
 };
 
 }  // namespace
 
-bool ScanToolOutput(ProjectBuilder& builder, std::string_view text) { return OutputScanner(builder).Scan(text); }
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text) {
+  return OutputScanner(builder).Scan(text);
+}
 
 }  // namespace qrex

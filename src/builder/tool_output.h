@@ -1,14 +1,19 @@
 // Reading what tools print: messages are counted, and those about translated files get a line that names the source.
 #pragma once
 
+#include <cstdint>
 #include <string_view>
 
-#include "builder/project_builder.h"
+#include "builder/build_files.h"
 
 namespace qrex {
 
+struct ToolMessages {
+  int64_t errors = 0, warnings = 0;
+};
+
 // Echoes the text. Two forms are recognised: `file(line) : error ...` and, of the gcc family, `file:line:column: error:
-// ...`. False if any line is an error.
-bool ScanToolOutput(ProjectBuilder& builder, std::string_view text);
+// ...`.
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text);
 
 }  // namespace qrex

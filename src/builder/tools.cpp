@@ -2,7 +2,10 @@
 
 #include "builder/tools.h"
 
-#include "builder/run_command.h"
+#include <utility>
+
+#include "builder/build_step.h"
+#include "builder/source_command.h"
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/files.h"
@@ -13,136 +16,82 @@
 
 namespace qrex {
 
-std::vector<std::string> IncludePaths(const Project& project, const ProjectConfig& config, bool translated) {
-  const std::string base = translated ? TranslationDirectory(config) : project.rootDir;
-  std::vector<std::string> paths = {PathJoin(base, project.rootToProjDir), PathJoin(base, project.sourceDir)};
-  if (translated) paths.push_back(base);
-  const auto& roots = project.settings->virtualTree;
-  paths.insert(paths.end(), roots.begin(), roots.end());
-  return paths;
-}
-
-std::string CompiledDirectory(const Project& project, const ProjectConfig& config) {
-  return project.usesQrex ? TranslationDirectory(config) : project.rootDir;
-}
-
-std::string_view GccTargetExtension(TargetType type) {
-  static constexpr std::string_view kExtensions[] = {"", "a", "", "so", "???"};
-  return kExtensions[static_cast<size_t>(type)];
-}
-
-std::string GccTargetName(const Project& project) {
-  const std::string_view extension = GccTargetExtension(project.targetType);
-  std::string name = (IsLibrary(project.targetType) ? "lib" : "") + project.name;
-  if (!extension.empty()) name.append(".").append(extension);
-  return name;
-}
-
-std::string GccTargetPath(const Project& project, const ProjectConfig& config) {
-  return project.settings->exportLib + "/" + config.platform + "/" + config.name + "/" + GccTargetName(project);
-}
-
-bool HasObject(const ProjectFile& file) {
-  return file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::Asm;
-}
-
-std::string ObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
-  const bool isCompiled = file.kind != FileKind::Asm;  // the one assembler names its objects its own way
-  const std::string_view extension = isCompiled && IsGccFamily(builder.settings.compiler) ? ".o" : ".obj";
-  std::string path;
-  path.reserve(builder.IntermediateDirectory().size() + 1 + file.stem.size() + extension.size());
-  path.append(builder.IntermediateDirectory()).append("/").append(file.stem).append(extension);
-  return path;
-}
-
-std::string ResourceObjectPath(const ProjectBuilder& builder, const ProjectFile& file) {
-  return builder.IntermediateDirectory() + "/" + file.stem + ".res";
-}
-
 namespace {
 
-std::string CompilerText(const ProjectBuilder& builder, const ProjectFile& file, const std::string& input) {
-  const std::string directory = builder.IntermediateDirectory();
-  MemoryTextWriter text;
-  auto writeIncludePaths = [&](std::string_view option) {
-    for (const std::string& path : IncludePaths(builder.project, builder.config, builder.project.usesQrex)) {
-      text << " " << option << Quoted(builder.settings, path);
-    }
-  };
-  if (IsGccFamily(builder.settings.compiler)) {
-    text << builder.config.compilerText;
-    writeIncludePaths("-I");
-    text << " -o " << QuotedInput(builder.settings, ObjectPath(builder, file));
-  } else {
-    const std::string_view prefix = CompilerOf(builder.settings.compiler).precompiledPrefix;
-    WriteCompilerSwitches(text, file, builder.config);
-    writeIncludePaths("/I ");
-    text << " /Fp\"" << directory << "/" << prefix << builder.project.name << ".pch\"";
-    text << " /Fo\"" << directory << "/\"";
-    text << " /Fd\"" << directory << "/\"";
-  }
-  text << " " << QuotedInput(builder.settings, input);
-  return text.TakeText();
+// Where a step puts what its tool reads. Steps that may run at once must not share it.
+std::string ResponseFile(const ProjectBuilder& builder, const SourceCommand& command) {
+  if (builder.scheduler.Overlaps()) return command.object + ".rsp";
+  return builder.paths.Intermediate() + "/" + std::string(command.name) + ".rsp";
 }
 
-// False when the tool could not be run at all: the trace log says why.
-bool RunOnResponseFile(const ProjectBuilder& builder, const std::string& responseFile, const std::string& text,
-                       const std::string& command, std::string& output, int& returnCode) {
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.output = &output;
-  options.errorsIntoOutput = IsGccFamily(builder.settings.compiler);  // where that family writes its messages
-  if (options.echo) TraceWriter() << responseFile << " = " << text << "\n";
-  try {
-    const CommandFile response(builder.settings.leftovers, responseFile, text);
-    if (RunCommand(builder.settings.tools, command + " @\"" + responseFile + "\"", returnCode, options)) return true;
-    TraceWriter() << responseFile << ": " << text << "\n";
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
-  }
-  return false;
-}
+// A compiler or assembler makes an object. Its output decides; the return code matters only where it says that the tool
+// did not come to its own end and, in the gcc family, that it failed without a message of the known forms.
+class SourceStep : public BuildStep {
+ public:
+  SourceStep(ProjectBuilder& builder, const ProjectFile& file, std::string hint)
+      : m_builder(builder),
+        m_file(file),
+        m_command(SourceCommandOf(builder.project, builder.config, file)),
+        m_responseFile(ResponseFile(builder, m_command)),
+        m_hint(std::move(hint)) {}
 
-// Runs a compiler or assembler and lets its output decide. The return code matters only where it says that the tool did
-// not come to its own end and, in the gcc family, that it failed without a message of the known forms.
-bool MakeObject(ProjectBuilder& builder, const ProjectFile& file, const std::string& responseFile,
-                const std::string& text, const std::string& command) {
-  const int64_t errorsBefore = builder.errorCount;
-  const bool isGcc = IsGccFamily(builder.settings.compiler);
-  std::string output;
-  int returnCode = 0;
-  RemoveLink(ObjectPath(builder, file));
-  try {
-    ToolOutputs object(builder.settings, {ObjectPath(builder, file)}, {responseFile});
-    const bool ran = RunOnResponseFile(builder, responseFile, text, command, output, returnCode);
-    if (ran && ScanToolOutput(builder, output) && !IsAbnormalEnd(returnCode) && !(isGcc && returnCode != 0)) {
-      return object.Keep();
+  std::optional<Command> Prepare() override {
+    if (std::exchange(m_hasBegun, true)) return std::nullopt;
+    const ConfigSettings& settings = m_builder.settings;
+    const std::string_view verb = m_file.kind == FileKind::Asm ? "Assembling " : "Compiling ";
+    if (settings.diagnostics) TraceWriter() << verb << m_file.path << "\n";
+    if (!ToolsTake(m_builder, {m_command.input, m_command.object})) return std::nullopt;
+    RemoveLink(m_command.object);
+    try {
+      m_outputs.emplace(settings, std::vector{m_command.object}, std::vector{m_responseFile});
+      if (settings.diagnostics) TraceWriter() << m_responseFile << " = " << m_command.text << "\n";
+      m_response.emplace(settings.leftovers, m_responseFile, m_command.text);
+    } catch (const FileException& exception) {
+      TraceWriter() << "Error: " << exception << "\n";
+      m_outputs.reset();
+      CountFailure();
+      return std::nullopt;
     }
+    return Command{.line = "cmd /c " + m_command.tool + " @\"" + m_responseFile + "\"",
+                   .echo = settings.diagnostics,
+                   .capturesOutput = true,
+                   .errorsIntoOutput = IsGcc()};  // where that family writes its messages
+  }
+
+  void Finish(const CommandResult& result) override {
+    m_response.reset();
+    if (!result.succeeded) TraceWriter() << m_responseFile << ": " << m_command.text << "\n";
+    const ToolMessages found = ScanToolOutput(m_builder, result.output);
+    m_builder.errorCount += found.errors;
+    m_builder.warningCount += found.warnings;
+    const bool endedItself = result.succeeded && result.end.IsNormal();
+    m_hasSucceeded = endedItself && found.errors == 0 && !(IsGcc() && result.ReturnCode() != 0);
     // A tool that came to its own end clears away what it could not finish; gcc's driver may have been the one to end.
-    if (ran && !isGcc && !IsAbnormalEnd(returnCode)) object.Keep();
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
+    if (m_hasSucceeded || (endedItself && !IsGcc())) m_outputs->Keep();
+    m_outputs.reset();
+    if (m_hasSucceeded) return;
+    if (found.errors == 0 && IsGcc() && result.ReturnCode() != 0) {
+      TraceWriter() << "Return code : " << result.ReturnCode() << "\n";
+    }
+    CountFailure(found.errors);
   }
-  if (builder.errorCount == errorsBefore) {
-    if (isGcc && returnCode != 0) TraceWriter() << "Return code : " << returnCode << "\n";
-    ++builder.errorCount;
+
+ private:
+  bool IsGcc() const { return IsGccFamily(m_builder.settings.compiler); }
+  void CountFailure(int64_t errors = 0) {
+    if (errors == 0) ++m_builder.errorCount;
+    if (!m_hint.empty()) TraceWriter() << Hint(m_hint);
   }
-  return false;
-}
 
-}  // namespace
-
-bool CompileFile(ProjectBuilder& builder, ScannedFile& scanned) {
-  const ProjectFile& file = scanned.file;
-  const std::string input = builder.project.usesQrex ? builder.TranslatedPath(scanned) : scanned.SourcePath();
-  if (builder.settings.diagnostics) TraceWriter() << "Compiling " << file.path << "\n";
-  if (!ToolsTake(builder, {input, ObjectPath(builder, file)})) return false;
-  return MakeObject(builder, file, builder.IntermediateDirectory() + "/compiler.rsp",
-                    CompilerText(builder, file, input),
-                    "cmd /c " + std::string(CompilerOf(builder.settings.compiler).compile));
-}
-
-namespace {
+  ProjectBuilder& m_builder;
+  const ProjectFile& m_file;
+  const SourceCommand m_command;
+  const std::string m_responseFile;
+  const std::string m_hint;  // if it fails
+  std::optional<ToolOutputs> m_outputs;
+  std::optional<CommandFile> m_response;
+  bool m_hasBegun = false;
+};
 
 bool IsFirstOfItsKind(const ProjectBuilder& builder, const ScannedFile& scanned) {
   for (const ScannedFile* file : builder.scanned) {
@@ -151,43 +100,58 @@ bool IsFirstOfItsKind(const ProjectBuilder& builder, const ScannedFile& scanned)
   return false;
 }
 
+class ResourceObjectStep : public BuildStep {
+ public:
+  ResourceObjectStep(ProjectBuilder& builder, const ScannedFile& file)
+      : m_builder(builder), m_file(file), m_output(builder.paths.ResourceObject(file.file)) {}
+
+  std::optional<Command> Prepare() override {
+    if (std::exchange(m_hasBegun, true)) return std::nullopt;
+    MemoryTextWriter line;
+    line << "rc.exe ";
+    WriteResourceSwitches(line, m_builder.config);
+    line << " /fo\"" << m_output << "\" \"" << m_file.SourcePath() << "\"";
+    TraceWriter() << "Compiling resource file " << m_file.file.path << "\n";
+    if (!ToolsTake(m_builder, {m_file.SourcePath(), m_output})) return std::nullopt;
+    RemoveLink(m_output);
+    try {
+      m_outputs.emplace(m_builder.settings, std::vector{m_output}, std::vector<std::string>());
+    } catch (const FileException& exception) {
+      TraceWriter() << "Error: " << exception << "\n";
+      ++m_builder.errorCount;
+      return std::nullopt;
+    }
+    return Command{.line = line.TakeText(), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
+  }
+
+  void Finish(const CommandResult& result) override {
+    m_hasSucceeded = result.succeeded;
+    if (m_hasSucceeded) m_outputs->Keep();
+    m_outputs.reset();
+    if (!m_hasSucceeded) ++m_builder.errorCount;
+  }
+
+ private:
+  ProjectBuilder& m_builder;
+  const ScannedFile& m_file;
+  const std::string m_output;
+  std::optional<ToolOutputs> m_outputs;
+  bool m_hasBegun = false;
+};
+
 }  // namespace
 
-bool AssembleFile(ProjectBuilder& builder, ScannedFile& scanned) {
-  const std::string directory = builder.IntermediateDirectory();
-  const std::string input = builder.TranslatedPath(scanned);
-  if (builder.settings.diagnostics) TraceWriter() << "Assembling " << scanned.file.path << "\n";
-  if (!ToolsTake(builder, {input, ObjectPath(builder, scanned.file)})) return false;
-  const std::string assembler = builder.config.platform == "Win64" ? "ml64" : "ml /coff";
-  const bool assembled =
-      MakeObject(builder, scanned.file, directory + "/masm.rsp", " /Fo\"" + directory + "/\" \"" + input + "\"",
-                 "cmd /c " + assembler + " /c /Cx /nologo");
-  if (!assembled && IsGccFamily(builder.settings.compiler) && IsFirstOfItsKind(builder, scanned)) {
-    TraceWriter() << Hint("an .asm is given to " + assembler + "; this compiler has no assembler of its own for it");
+std::unique_ptr<BuildStep> ObjectStep(ProjectBuilder& builder, const ScannedFile& scanned) {
+  std::string hint;
+  if (scanned.file.kind == FileKind::Asm && IsGccFamily(builder.settings.compiler) &&
+      IsFirstOfItsKind(builder, scanned)) {
+    hint = "an .asm is given to " + AssemblerOf(builder.config) + "; this compiler has no assembler of its own for it";
   }
-  return assembled;
+  return std::make_unique<SourceStep>(builder, scanned.file, std::move(hint));
 }
 
-bool CompileResource(ProjectBuilder& builder, ScannedFile& scanned) {
-  MemoryTextWriter command;
-  command << "rc.exe ";
-  WriteResourceSwitches(command, builder.config);
-  command << " /fo\"" << ResourceObjectPath(builder, scanned.file) << "\" \"" << scanned.SourcePath() << "\"";
-  TraceWriter() << "Compiling resource file " << scanned.file.path << "\n";
-  if (!ToolsTake(builder, {scanned.SourcePath(), ResourceObjectPath(builder, scanned.file)})) return false;
-  RemoveLink(ResourceObjectPath(builder, scanned.file));
-  CommandOptions options;
-  options.echo = builder.settings.diagnostics;
-  options.failOnNonZero = true;
-  int returnCode;
-  try {
-    ToolOutputs resource(builder.settings, {ResourceObjectPath(builder, scanned.file)}, {});
-    if (RunCommand(builder.settings.tools, command.TakeText(), returnCode, options)) return resource.Keep();
-  } catch (const FileException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
-  }
-  ++builder.errorCount;
-  return false;
+std::unique_ptr<BuildStep> ResourceStep(ProjectBuilder& builder, const ScannedFile& scanned) {
+  return std::make_unique<ResourceObjectStep>(builder, scanned);
 }
 
 }  // namespace qrex

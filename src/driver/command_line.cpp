@@ -5,6 +5,7 @@
 #include <set>
 
 #include "driver/config_parser.h"
+#include "driver/data_folder.h"
 #include "driver/init.h"
 #include "driver/manual.h"
 #include "driver/run_workspace.h"
@@ -105,7 +106,7 @@ void CommandLine::RunParallelBuild() {
   }
   TraceWriter() << "\n" << command << "\n";
   ScopeTimer timer;
-  const int result = platform::RunCommand(m_settings.tools, command);
+  const int result = m_settings.tools.Run({.line = command}).end.InterpreterCode();
   m_settings.tools.Stop();
   if (result != 0) TraceWriter() << command << " failed with error code " << result << "\n";
   timer.Stop();
@@ -136,7 +137,8 @@ int CommandLine::RunConfiguration() {
     if (!FileExists(m_configPath)) TraceWriter() << Hint(NoConfigurationHint(m_arguments[configIndex]));
     return 1;
   }
-  const std::string problem = ValidateSettings(m_settings);
+  std::string problem = ValidateSettings(m_settings);
+  if (problem.empty()) problem = AddRuntimeRoot(m_settings, m_arguments[0]);
   if (!problem.empty()) {
     WriteToConsole(problem + "Error in config file " + m_configPath + "\n");
     return 1;

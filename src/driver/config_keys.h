@@ -23,6 +23,9 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"systemProcessor", &ConfigSettings::systemProcessor, "@system_processor"},
     {"systemVersion", &ConfigSettings::systemVersion, "@system_version"},
     {"sizeofPointer", &ConfigSettings::sizeofPointer, "@size_of_pointer"},
+    {"platformToolset", &ConfigSettings::platformToolset,
+     "the tool set in .vcxproj files: v143; projects may name theirs, too"},
+    {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
 };
 
 inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
@@ -75,5 +78,8 @@ inline constexpr ModeWord kModes[] = {
     {"gen", "write the project files of the compiler"},
     {"show", "print where the translation of $COMPILE_FILE_PATH stands"},
 };
+
+inline constexpr std::string_view kRuntimes[] = {"none", "source", "built"};  // by RuntimeChoice
+inline constexpr std::string_view kRuntimeHelp = "a root behind virtualTree: this tool's runtime, source or built";
 
 }  // namespace qrex

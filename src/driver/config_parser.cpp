@@ -22,6 +22,12 @@ std::string ModeWords() {
   return words;
 }
 
+std::string RuntimeWords() {
+  std::string words;
+  for (const std::string_view word : kRuntimes) words.append(words.empty() ? "" : " ").append(word);
+  return words;
+}
+
 class ConfigParser : public MpfwParser {
  public:
   explicit ConfigParser(ConfigSettings& settings) : MpfwParser(settings.context), m_settings(settings) {}
@@ -41,6 +47,10 @@ class ConfigParser : public MpfwParser {
 
  private:
   void ParseStatement();
+  bool ParseChoice();
+  bool ChooseCompiler(const std::string& word, const LexToken& token);
+  bool ChooseMode(const std::string& word, const LexToken& token);
+  bool ChooseRuntime(const std::string& word, const LexToken& token);
   void ParseVariable();
   void ParseEnvironment(std::string PlatformEnvironment::*field);
   void ParseList(std::vector<std::string>& list);
@@ -52,28 +62,54 @@ class ConfigParser : public MpfwParser {
   ConfigSettings& m_settings;
 };
 
-void ConfigParser::ParseStatement() {
-  if (ParseImportStatement()) return;
-  if (current.Is("compiler") || current.Is("mode")) {
-    const bool isMode = current.Is("mode");
+// A key that takes one of a few words.
+bool ConfigParser::ParseChoice() {
+  static constexpr struct {
+    std::string_view key;
+    std::string (*words)();
+    bool (ConfigParser::*choose)(const std::string& word, const LexToken& token);
+  } kChoices[] = {{"compiler", CompilerWords, &ConfigParser::ChooseCompiler},
+                  {"mode", ModeWords, &ConfigParser::ChooseMode},
+                  {"runtime", RuntimeWords, &ConfigParser::ChooseRuntime}};
+  for (const auto& choice : kChoices) {
+    if (!current.Is(choice.key)) continue;
     Advance();
     Expect(kAssign, "=");
     const LexToken token = current;
-    const std::string word = ReadWord();
-    if (isMode) {
-      for (size_t i = 0; i < std::size(kModes); ++i) {
-        if (word != kModes[i].word) continue;
-        m_settings.mode = static_cast<RunMode>(i);
-        if (!IsAddedText(m_settings.sourceFiles, token.text.begin)) m_settings.fileMode = m_settings.mode;
-        return;
-      }
-    } else if (const auto compiler = FindCompiler(word)) {
-      m_settings.compiler = *compiler;
-      return;
-    }
-    throw LexScannerException("Invalid option : " + Printed(token), token)
-        .WithHint("one of " + (isMode ? ModeWords() : CompilerWords()));
+    if ((this->*choice.choose)(ReadWord(), token)) return true;
+    throw LexScannerException("Invalid option : " + Printed(token), token).WithHint("one of " + choice.words());
   }
+  return false;
+}
+
+bool ConfigParser::ChooseCompiler(const std::string& word, const LexToken&) {
+  const auto compiler = FindCompiler(word);
+  if (compiler) m_settings.compiler = *compiler;
+  return compiler.has_value();
+}
+
+bool ConfigParser::ChooseMode(const std::string& word, const LexToken& token) {
+  for (size_t i = 0; i < std::size(kModes); ++i) {
+    if (word != kModes[i].word) continue;
+    m_settings.mode = static_cast<RunMode>(i);
+    if (!IsAddedText(m_settings.sourceFiles, token.text.begin)) m_settings.fileMode = m_settings.mode;
+    return true;
+  }
+  return false;
+}
+
+bool ConfigParser::ChooseRuntime(const std::string& word, const LexToken&) {
+  for (size_t i = 0; i < std::size(kRuntimes); ++i) {
+    if (word != kRuntimes[i]) continue;
+    m_settings.runtime = static_cast<RuntimeChoice>(i);
+    return true;
+  }
+  return false;
+}
+
+void ConfigParser::ParseStatement() {
+  if (ParseImportStatement()) return;
+  if (ParseChoice()) return;
   if (current.kind == kDollar) return ParseVariable();
   if (const auto* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
   if (const auto* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
@@ -200,8 +236,7 @@ bool LoadConfiguration(ConfigSettings& settings, const std::string& path, const 
     return true;
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);
-    TraceWriter trace;
-    ReportParseError(settings.sourceFiles, trace, exception);
+    settings.macroWorld.messages->Take(ParseErrorOf(settings.sourceFiles, exception));
     return false;
   }
 }

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <vector>
 
+#include "driver/data_folder.h"
 #include "platform/file_system.h"
-#include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
@@ -17,10 +17,8 @@ namespace {
 // In the names and the texts of templates.
 constexpr char kNameInPaths[] = "NAME";
 constexpr char kNameInTexts[] = "{{NAME}}";
-constexpr char kRuntimeInTexts[] = "{{RUNTIME}}";
 constexpr char kHiddenName[] = "dot.";  // begins the name of a file that is to begin with a dot
 constexpr char kTemplates[] = "templates/workspace";
-constexpr char kRuntime[] = "runtime";
 constexpr char kBesideEnd[] = ".qrex-init.part";  // of the folder in which a workspace is laid out
 
 bool Complain(const std::string& message) {
@@ -36,28 +34,6 @@ bool IsIdentifier(const std::string& name) {
          std::all_of(name.begin(), name.end(), [&](char c) { return isLetter(c) || isDigit(c); });
 }
 
-// The folder that holds templates and runtime: beside the program, around it (a build folder in the sources), or where
-// an installation puts them, seen from the program or from the root.
-bool FindData(const std::string& calledAs, std::string& data) {
-  std::vector<std::string> candidates;
-  if (const std::string program = platform::ProgramPath(calledAs); !program.empty()) {
-    const std::string folder = program.substr(0, program.rfind('/'));
-    for (const char* place : {".", "..", "../share/qrex"}) candidates.push_back(folder + "/" + place);
-  }
-  candidates.push_back(QREX_DATA_FOLDER);
-  std::string tried;
-  for (const std::string& candidate : candidates) {
-    platform::FileInfo templates, runtime;
-    if (platform::Stat(candidate + "/" + kTemplates, templates) &&
-        platform::Stat(candidate + "/" + kRuntime, runtime)) {
-      Require(RealPathOf(candidate, data), candidate);
-      return true;
-    }
-    tried += "\n    " + candidate;
-  }
-  return Complain("No " + std::string(kTemplates) + " and " + kRuntime + " in any of" + tried);
-}
-
 struct LaidOutFile {
   std::string path;
   std::string text;
@@ -65,8 +41,7 @@ struct LaidOutFile {
 
 class Layout {
  public:
-  Layout(const std::string& name, const std::string& folder, const std::string& data)
-      : m_name(name), m_runtime(data + "/" + kRuntime) {
+  Layout(const std::string& name, const std::string& folder, const std::string& data) : m_name(name) {
     Add(data + "/" + kTemplates, folder);
   }
   const std::vector<LaidOutFile>& Files() const { return m_files; }
@@ -88,7 +63,6 @@ class Layout {
       file.path = target;
       Require(ReadWholeFile(file.text, from + "/" + source), from + "/" + source);
       ReplaceAllInPlace(file.text, kNameInTexts, m_name);
-      ReplaceAllInPlace(file.text, kRuntimeInTexts, m_runtime);
     }
   }
 
@@ -99,7 +73,6 @@ class Layout {
   }
 
   std::string m_name;
-  std::string m_runtime;
   std::vector<LaidOutFile> m_files;
 };
 
@@ -144,9 +117,10 @@ bool IsMissing(const std::string& folder) {
 
 bool LayOut(const std::string& calledAs, const std::string& name, const std::string& folder) {
   if (!IsIdentifier(name)) return Complain(name + " can't name a workspace: letters, digits and _, a letter first");
-  std::string data;
-  if (!FindData(calledAs, data)) return false;
-  const Layout layout(name, folder, data);
+  std::string tried;
+  const auto data = FindDataFolder(calledAs, {{kTemplates, kRuntimePart}}, tried);
+  if (!data) return Complain("No " + std::string(kTemplates) + " and " + kRuntimePart + " in any of" + tried);
+  const Layout layout(name, folder, *data);
   std::vector<LaidOutFile> missing;
   for (const LaidOutFile& file : layout.Files()) {
     const Place place = PlaceOf(file);

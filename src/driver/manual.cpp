@@ -55,6 +55,8 @@ std::vector<ManualRow> KeyRows() {
   add("compiler", Word(" = ", CompilerOf(defaults.compiler).keyword), "one of " + CompilerWords());
   for (const Compiler& compiler : kCompilers) rows.back().values.emplace_back(compiler.keyword);
   for (const auto& key : kListKeys) add(key.word, " = { }", key.help);
+  add("runtime", Word(" = ", kRuntimes[static_cast<size_t>(defaults.runtime)]), kRuntimeHelp);
+  for (const std::string_view runtime : kRuntimes) rows.back().values.emplace_back(runtime);
   for (const auto& key : kStringKeys) add(key.word, " = \"\"", key.help);
   for (const auto& key : kBoolKeys) {
     add(key.word, defaults.*key.field ? " = true" : " = false", key.help);
@@ -161,7 +163,9 @@ std::string ManualPage() {
       ".SH EXIT STATUS\n"
       "0, or 1 when the run could not do what it was told. Errors of compilers and linkers are counted in the last "
       "line.\n"
-      ".SH ENVIRONMENT\n.TP\n.B QREX_PYTHON\n"
+      ".SH ENVIRONMENT\n.TP\n.B QREX_DATA_FOLDER\n"
+      "the folder that holds templates and runtime, in place of that of the program.\n"
+      ".TP\n.B QREX_PYTHON\n"
       "the library of Python that @python directives load; the only one that is tried.\n"
       ".SH SEE ALSO\n"
       "The pages in\n.IR /usr/share/doc/qrex/docs ,\nof which\n.I tutorial.md\nis the first to read.\n";

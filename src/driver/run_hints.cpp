@@ -41,7 +41,7 @@ void TellCopiedSources(const Project& project) {
 
 void HintAtCallOfMake(const Workspace& workspace) {
   const ConfigSettings& settings = workspace.settings;
-  if (CompilerOf(settings.compiler).format != ProjectFormat::Make || !AnyProjectUsesQrex(workspace)) return;
+  if (!CompilerOf(settings.compiler).Writes(ProjectFormat::Make) || !AnyProjectUsesQrex(workspace)) return;
   const std::string called = workspace.name + ".qrex";
   const std::string& path = settings.sourceFiles.front()->path;  // of the configuration: all else is loaded through it
   if (CollapseDots(path) != called) {

@@ -104,7 +104,8 @@ bool WorkspaceRun::LoadAll() {
 bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
   std::string fullPath;
   if (!FindInTree(m_settings, entry, m_workspace.rootDir, fullPath)) {
-    TraceWriter() << "Error: Couldn't open workspace file " << entry << "\n" << Hint(TriedInTree(m_settings, entry));
+    m_settings.Tell(Message(Severity::Error, "Error: ", "Couldn't open workspace file " + entry)
+                        .WithHint(TriedInTree(m_settings, entry)));
     return false;
   }
   CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
@@ -123,8 +124,7 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
     return true;
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);
-    TraceWriter trace;
-    ReportParseError(m_settings.sourceFiles, trace, exception);
+    m_settings.macroWorld.messages->Take(ParseErrorOf(m_settings.sourceFiles, exception));
     return false;
   }
 }
@@ -281,23 +281,27 @@ std::string KnownConfigs(const Project& project) {
 ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
   ProjectConfig* config = project.FindConfig(m_settings.config, m_settings.platform);
   if (!config) {
-    TraceWriter() << "Error: There is no configuration " << m_settings.config << "|" << m_settings.platform
-                  << " in project " << project.name << "\n"
-                  << Hint(KnownConfigs(project));
+    const std::string wanted = m_settings.config + "|" + m_settings.platform;
+    m_settings.Tell(
+        Message(Severity::Error, "Error: ", "There is no configuration " + wanted + " in project " + project.name)
+            .WithHint(KnownConfigs(project)));
   }
   return config;
 }
 
 // What ends a build early is reported here, and ends the run.
 template <typename Work>
-bool Guarded(Work work) {
+bool Guarded(const ConfigSettings& settings, Work work) {
   try {
     work();
     return true;
   } catch (const LexScannerException& exception) {
-    TraceWriter() << "\n" << exception << "\n" << Hint(exception.hint);
+    settings.Tell(Message(Severity::Error, "error : ", exception.message)
+                      .At({exception.file, exception.line, exception.begin, exception.end})
+                      .WithHint(exception.hint)
+                      .Apart());
   } catch (const IException& exception) {
-    TraceWriter() << "Error: " << exception << "\n";
+    settings.Tell(Message(Severity::Error, "Error: ", ExceptionText(exception)));
   }
   return false;
 }
@@ -305,7 +309,7 @@ bool Guarded(Work work) {
 bool WorkspaceRun::BuildProject(Project& project) {
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
-  return Guarded([&] {
+  return Guarded(m_settings, [&] {
     ProjectBuilder builder(m_settings, project, *config);
     ScopeTimer timer;
     const std::string dependencyFile = DependencyFilePath(project, *config);
@@ -366,8 +370,8 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
   ProjectBuilder builder(m_settings, project, *config);
-  DeleteReporting(builder.TranslatedPath(*file));
-  if (!Guarded([&] { builder.Build(DependencyFilePath(project, *config), file); })) return false;
+  DeleteReporting(builder.paths.Translated(*file));
+  if (!Guarded(m_settings, [&] { builder.Build(DependencyFilePath(project, *config), file); })) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Compile completed";
@@ -446,7 +450,7 @@ void WaitForOtherBuilds(platform::FolderLock& folder) {
 
 // The keeper shares the lock: the next build must not find it held any more.
 struct KeeperEnd {
-  platform::ToolKeeper& tools;
+  platform::Processes& tools;
   ~KeeperEnd() { tools.Stop(); }
 };
 

@@ -2,7 +2,7 @@
 
 #include <vector>
 
-#include "builder/tools.h"
+#include "builder/source_command.h"
 #include "generators/common.h"
 #include "generators/xml.h"
 #include "text/numbers.h"
@@ -46,7 +46,7 @@ void WriteTarget(XmlWriter& xml, const Project& project, const ProjectConfig& co
   }
   {
     const XmlElement compiler(xml, "Compiler");
-    WriteSwitches(xml, config.compilerText, "-MMD");
+    WriteSwitches(xml, CommonSwitchesOf(project, config).raw, "-MMD");
   }
   const XmlElement linker(xml, "Linker");
   WriteSwitches(xml, config.linkerText, "-shared");

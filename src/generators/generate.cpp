@@ -57,15 +57,13 @@ void Generator::Generate(const std::string& path, void (*write)(TextWriter&, Arg
   if (UpdateFile(m_leftovers, out, path) != FileUpdate::Failed) m_upToDate.insert(path);
 }
 
-void Generator::WriteGccProject(Project& project) {
-  if (!project.exported) {
-    for (const auto& config : project.configs) {
-      const std::string name = MakeFileName(project.name, *config);
-      if (MakeTakes(m_form, name, NameThatMakeReads(project, *config)))
-        Generate(name, WriteProjectMakeFile, project, *config);
-    }
+void Generator::WriteProjectMakeFiles(Project& project) {
+  if (project.exported) return;
+  for (const auto& config : project.configs) {
+    const std::string name = MakeFileName(project.name, *config);
+    if (MakeTakes(m_form, name, NameThatMakeReads(project, *config)))
+      Generate(name, WriteProjectMakeFile, project, *config);
   }
-  Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
 }
 
 void Generator::WriteTopMakeFiles(const Workspace& workspace) {
@@ -75,8 +73,7 @@ void Generator::WriteTopMakeFiles(const Workspace& workspace) {
   Generate(workspace.name + ".make", WriteTopMakeFile, workspace);
 }
 
-void Generator::WriteGccWorkspace(const Workspace& workspace) {
-  if (workspace.projects.empty()) return;
+void Generator::WriteWorkspaceMakeFiles(const Workspace& workspace) {
   const std::unordered_set<std::string> taken = ProjectMakeFiles(workspace);
   for (const auto& config : workspace.projects.front()->configs) {
     const std::string name = MakeFileName(workspace.name, *config);
@@ -88,38 +85,57 @@ void Generator::WriteGccWorkspace(const Workspace& workspace) {
     Generate(name, WriteWorkspaceMakeFile, workspace, *config);
   }
   WriteTopMakeFiles(workspace);
-  m_upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies
-  Generate(workspace.name + ".workspace", WriteCodeBlocksWorkspace, workspace);
-  Generate(workspace.name + ".geany", WriteGeanyProject, workspace);
+}
+
+void Generator::WriteProjectFiles(Project& project, ProjectFormat format) {
+  const std::string stem = std::string(NamePrefix(m_form)) + project.name;
+  switch (format) {
+    case ProjectFormat::Dsp:
+      return Generate(stem + ".dsp", WriteVc6Project, project, m_form);
+    case ProjectFormat::Vcproj:
+      return Generate(stem + ".vcproj", WriteVc8Project, project, m_form);
+    case ProjectFormat::Vcxproj:
+      Generate(stem + ".vcxproj", WriteVc10Project, project, m_form);
+      return Generate(stem + ".vcxproj.filters", WriteVc10Filters, project, m_form);
+    case ProjectFormat::Make:
+      return WriteProjectMakeFiles(project);
+    case ProjectFormat::CodeBlocks:
+      return Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
+    case ProjectFormat::Geany:  // has a file for the workspace alone
+      return;
+  }
+}
+
+void Generator::WriteWorkspaceFiles(Workspace& workspace, ProjectFormat format) {
+  const std::string stem = std::string(NamePrefix(m_form)) + workspace.name;
+  switch (format) {
+    case ProjectFormat::Dsp:
+      return Generate(stem + ".dsw", WriteVc6Workspace, workspace, m_form);
+    case ProjectFormat::Vcproj:
+    case ProjectFormat::Vcxproj:
+      return Generate(stem + ".sln", WriteSolution, workspace, m_form);
+    case ProjectFormat::Make:
+      if (!workspace.projects.empty()) WriteWorkspaceMakeFiles(workspace);
+      return;
+    case ProjectFormat::CodeBlocks:
+      if (workspace.projects.empty()) return;
+      m_upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies
+      return Generate(workspace.name + ".workspace", WriteCodeBlocksWorkspace, workspace);
+    case ProjectFormat::Geany:
+      if (!workspace.projects.empty()) Generate(workspace.name + ".geany", WriteGeanyProject, workspace);
+      return;
+  }
 }
 
 void Generator::WriteProject(Project& project, Form form) {
   BeginPass(form);
-  const std::string stem = std::string(NamePrefix(form)) + project.name;
-  switch (CompilerOf(project.settings->compiler).format) {
-    case ProjectFormat::Dsp:
-      return Generate(stem + ".dsp", WriteVc6Project, project, form);
-    case ProjectFormat::Vcproj:
-      return Generate(stem + ".vcproj", WriteVc8Project, project, form);
-    case ProjectFormat::Vcxproj:
-      Generate(stem + ".vcxproj", WriteVc10Project, project, form);
-      return Generate(stem + ".vcxproj.filters", WriteVc10Filters, project, form);
-    case ProjectFormat::Make:
-      return WriteGccProject(project);
-  }
+  for (const ProjectFormat format : CompilerOf(project.settings->compiler).formats) WriteProjectFiles(project, format);
 }
 
 void Generator::WriteWorkspace(Workspace& workspace, Form form) {
   BeginPass(form);
-  const std::string stem = std::string(NamePrefix(form)) + workspace.name;
-  switch (CompilerOf(workspace.settings.compiler).format) {
-    case ProjectFormat::Dsp:
-      return Generate(stem + ".dsw", WriteVc6Workspace, workspace, form);
-    case ProjectFormat::Vcproj:
-    case ProjectFormat::Vcxproj:
-      return Generate(stem + ".sln", WriteSolution, workspace, form);
-    case ProjectFormat::Make:
-      return WriteGccWorkspace(workspace);
+  for (const ProjectFormat format : CompilerOf(workspace.settings.compiler).formats) {
+    WriteWorkspaceFiles(workspace, format);
   }
 }
 

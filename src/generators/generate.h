@@ -24,9 +24,11 @@ class Generator {
   void BeginPass(Form form);
   template <typename... Args>
   void Generate(const std::string& path, void (*write)(TextWriter&, Args...), std::type_identity_t<Args>... args);
-  void WriteGccProject(Project& project);
+  void WriteProjectFiles(Project& project, ProjectFormat format);
+  void WriteWorkspaceFiles(Workspace& workspace, ProjectFormat format);
+  void WriteProjectMakeFiles(Project& project);
+  void WriteWorkspaceMakeFiles(const Workspace& workspace);
   void WriteTopMakeFiles(const Workspace& workspace);
-  void WriteGccWorkspace(const Workspace& workspace);
 
   LeftoverSweep& m_leftovers;
   // Files of the project or workspace that are up to date. The gcc family has one form of its files: the second pass

@@ -2,7 +2,7 @@
 
 #include <initializer_list>
 
-#include "builder/tools.h"
+#include "builder/source_command.h"
 #include "generators/common.h"
 #include "text/paths.h"
 #include "text/version.h"
@@ -43,7 +43,7 @@ void WriteLibraries(TextWriter& out, const Project& project) {
 }
 
 void WriteVariables(TextWriter& out, const Project& project, const ProjectConfig& config, std::string_view target) {
-  const auto includes = IncludePaths(project, config, project.usesQrex);
+  const CommonSwitches switches = CommonSwitchesOf(project, config);
   auto writeInclude = [&](const std::string& path) { Write(out, R"( -I"$path$")", "path"_ = path); };
   Write(out, R"(
     # Tools
@@ -61,8 +61,8 @@ void WriteVariables(TextWriter& out, const Project& project, const ProjectConfig
 
   )",
         "tools"_([&] { out << CompilerOf(project.settings->compiler).makeTools; }), "target"_ = target,
-        "compiler"_ = config.compilerText, "linker"_ = config.linkerText,
-        "libraries"_([&] { WriteLibraries(out, project); }), "includes"_ = Each(out, includes, "", writeInclude));
+        "compiler"_ = switches.raw, "linker"_ = config.linkerText, "libraries"_([&] { WriteLibraries(out, project); }),
+        "includes"_ = Each(out, switches.includePaths, "", writeInclude));
 }
 
 void WriteTargetRule(TextWriter& out, const Project& project, std::string_view target) {
@@ -91,7 +91,7 @@ void FindNameWith(std::string_view characters, std::initializer_list<std::string
 std::string NameThatMakeReads(const Project& project, const ProjectConfig& config) {
   std::string found;
   FindNameWith(kRead, {GccTargetPath(project, config)}, found);
-  for (const std::string& path : IncludePaths(project, config, project.usesQrex)) {
+  for (const std::string& path : CommonSwitchesOf(project, config).includePaths) {
     FindNameWith(kReadInQuotes, {path}, found);
   }
   const std::string sources = CompiledDirectory(project, config) + "/";
@@ -109,7 +109,8 @@ std::string NameThatMakeReads(const Workspace& workspace, const ProjectConfig& c
 
 void WriteProjectMakeFile(TextWriter& out, const Project& project, const ProjectConfig& config) {
   const std::string target = GccTargetPath(project, config);
-  const std::string objects = config.platform + "/" + config.name + "/" + project.name + "/";
+  // In pieces, as there are many: the paths of BuildPaths.
+  const std::string objects = BuildPaths(project, config).Intermediate() + "/";
   const std::string sources = CompiledDirectory(project, config) + "/";
   const auto files = CompiledFiles(project);
   auto writeObject = [&](const ProjectFile* file) { out << objects << file->stem << ".o"; };
@@ -132,8 +133,10 @@ void WriteProjectMakeFile(TextWriter& out, const Project& project, const Project
          "-include $(OBJS:.o=.d)\n\n";
   WriteTargetRule(out, project, target);
   for (const ProjectFile* file : files) {
-    out << objects << file->stem << ".o: " << sources << file->path
-        << (file->kind == FileKind::Cpp ? "\n\t$(CXX) -c $(CXXFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n"
+    writeObject(file);
+    out << ": ";
+    writeSource(file);
+    out << (file->kind == FileKind::Cpp ? "\n\t$(CXX) -c $(CXXFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n"
                                         : "\n\t$(CC) -c $(CFLAGS) $(INCLUDE_PATH) -o $@ $<\n\n");
   }
   out << ".PHONY : clean\nclean:\n\trm -f " << target << " $(OBJS:.o=.d) $(OBJS)\n";

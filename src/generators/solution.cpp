@@ -25,7 +25,7 @@ void WriteDependencies(TextWriter& out, const Project& project) {
 }
 
 void WriteProject(TextWriter& out, const Project& project, Form form) {
-  const bool isNewFormat = CompilerOf(project.settings->compiler).format == ProjectFormat::Vcxproj;
+  const bool isNewFormat = CompilerOf(project.settings->compiler).Writes(ProjectFormat::Vcxproj);
   auto writeDependencies = [&] {
     // The newer project files name their dependencies themselves.
     if (!isNewFormat && !project.subprojects.empty()) WriteDependencies(out, project);

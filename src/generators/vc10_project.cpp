@@ -64,6 +64,15 @@ std::string_view ConfigurationType(TargetType type) {
   return kNames[static_cast<size_t>(type)];
 }
 
+// Empty for the one compiler that has no name for its own.
+std::string Toolset(const Project& project, const ProjectConfig& config) {
+  if (!config.platformToolset.empty()) return config.platformToolset;
+  const ConfigSettings& settings = *project.settings;
+  if (!settings.platformToolset.empty()) return settings.platformToolset;
+  const std::string toolset(CompilerOf(settings.compiler).toolset);
+  return toolset.empty() || !settings.targetXP ? toolset : toolset + "_xp";
+}
+
 std::string_view ItemName(const ProjectFile& file) {
   if (file.excluded) return "None";
   switch (file.kind) {
@@ -174,6 +183,10 @@ void ProjectWriter::WriteAll() {
   {
     const XmlElement globals(m_xml, "PropertyGroup", {{"Label", "Globals"}});
     m_xml.Value("ProjectGuid", GuidText(m_project.guid));
+    const ConfigSettings& settings = *m_project.settings;
+    if (!settings.platformToolset.empty()) {  // without it, a tool set of today looks for Windows SDK 8.1
+      m_xml.Value("WindowsTargetPlatformVersion", settings.windowsSdk.empty() ? "10.0" : settings.windowsSdk);
+    }
   }
   m_xml.Empty("Import", {{"Project", R"($(VCTargetsPath)\Microsoft.Cpp.Default.props)"}});
   for (const auto& config : m_project.configs) WriteConfigurationGroup(*config);
@@ -205,9 +218,8 @@ void ProjectWriter::WriteConfigurations() {
 void ProjectWriter::WriteConfigurationGroup(const ProjectConfig& config) {
   const XmlElement group(m_xml, "PropertyGroup", {{"Condition", Condition(config)}, {"Label", "Configuration"}});
   m_xml.Value("ConfigurationType", ConfigurationType(m_project.targetType));
-  const std::string_view toolset = CompilerOf(m_project.settings->compiler).toolset;
-  if (!toolset.empty()) {
-    m_xml.Value("PlatformToolset", std::string(toolset) + (m_project.settings->targetXP ? "_xp" : ""));
+  if (const std::string toolset = Toolset(m_project, config); !toolset.empty()) {
+    m_xml.Value("PlatformToolset", toolset);
   }
   for (const EnumeratedOption& option : kConfigurationOptions) WriteEnumerated(config.generalOptions, option);
   if (!WriteEnumerated(config.generalOptions, kManagedOption)) WriteEnumerated(config.compilerOptions, kManagedOption);

@@ -1,6 +1,6 @@
 #include "generators/vc6_project.h"
 
-#include "builder/tools.h"
+#include "builder/build_paths.h"
 #include "generators/common.h"
 #include "text/paths.h"
 #include "translator/emit/write.h"

@@ -1,6 +1,6 @@
 #include "generators/vs_common.h"
 
-#include "builder/project_builder.h"
+#include "builder/build_paths.h"
 #include "generators/common.h"
 #include "text/paths.h"
 #include "workspace/linker_text.h"

@@ -153,6 +153,12 @@ bool SkipDigits(LexScanner& scanner) {
   return at > begin;
 }
 
+const char* EndOfWord(const TextRange& text, const char* position) {
+  const char* end = position;
+  while (end < text.end && IsIdentifierPart(*end)) ++end;
+  return end == position && end < text.end ? end + 1 : end;
+}
+
 int64_t LineOfPosition(const TextRange& text, const char* position) {
   if (!text.Contains(position)) return -1;
   int64_t line = 1;

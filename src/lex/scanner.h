@@ -106,6 +106,7 @@ inline LexToken NextToken(LexScanner& scanner, bool keepComments = false) {
 }
 
 bool SkipDigits(LexScanner& scanner);
+const char* EndOfWord(const TextRange& text, const char* position);   // of one byte where no word begins
 int64_t LineOfPosition(const TextRange& text, const char* position);  // 1-based; -1 outside
 // The same for many positions in one text, which must stay where it is.
 class LineStarts {

@@ -12,6 +12,7 @@
 #include <string_view>
 
 #include "text/exceptions.h"
+#include "text/message.h"
 
 namespace qrex {
 
@@ -148,10 +149,17 @@ class LexScannerException : public IException {
     return *this;
   }
 
+  void SetPlace(const SourcePlace& place) {
+    file = place.file;
+    line = place.line;
+    begin = place.begin;
+    end = place.end;
+  }
   std::string message;  // enclosing contexts append to it and patch it on the way out
   std::string hint;     // what a terminal shows behind the message
   std::string file;     // empty until located
   int64_t line = -1;
+  int64_t begin = -1, end = -1;  // bytes in the file's text
   const char* position;
 };
 

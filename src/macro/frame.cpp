@@ -170,9 +170,22 @@ constexpr size_t kMaxSubstituted = 64u << 20;
 LSFileFrame::LSFileFrame(MacroWorld& world) : LSFrame(world), m_index(world.fileFrames++) { m_fileFrame = this; }
 LSFileFrame::LSFileFrame(LSFrame* parent) : LSFrame(parent), m_index(m_world.fileFrames++) { m_fileFrame = this; }
 
-LSFileFrame::~LSFileFrame() {
-  // Not by the names of the variables: these may be in the text of another file, which may be gone.
+LSFileFrame::~LSFileFrame() { LeaveDefinitions(); }
+
+// Not by the names of the variables: these may be in the text of another file, which may be gone.
+void LSFileFrame::LeaveDefinitions() {
   for (std::string_view name : m_entered) m_world.definitions.Remove(name, m_index);
+}
+
+void LSFileFrame::Clear() {
+  LeaveDefinitions();
+  m_entered.clear();
+  m_names.reset();
+  m_variables.clear();
+  m_allImports = {};
+  m_directImports.clear();
+  m_orderedImports.clear();
+  m_substitutions.clear();
 }
 
 void LSFileFrame::OnAdded(LSVariable& variable, bool replaces) {

@@ -167,12 +167,14 @@ class LSFileFrame : public LSFrame {
   const std::string* FindSubstitution(std::string_view name) const;
   bool Substitute(std::string& text) const;  // expands $(name) in place, repeatedly; true if anything changed
   void CopyFrom(const LSFileFrame& other);   // the definitions and substitutions of another frame
+  void Clear();                              // as it was made, but for its dialect
 
  protected:
   void OnAdded(LSVariable& variable, bool replaces) override;
 
  private:
   class NearestDefinition;
+  void LeaveDefinitions();
   bool SubstituteOnce(std::string& text) const;
 
   const size_t m_index;

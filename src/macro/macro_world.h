@@ -9,6 +9,9 @@
 #include <unordered_map>
 #include <vector>
 
+#include "text/message.h"
+#include "text/source_texts.h"
+
 namespace qrex {
 
 class ExpansionSink;
@@ -78,6 +81,8 @@ struct ExpansionLimits {
 };
 
 struct MacroWorld {
+  const SourceTexts* sources = &DiskTexts();     // where all texts of the run are read
+  MessageConsumer* messages = &TraceMessages();  // takes what is to be told of them
   NamesInUse names;
   DefinitionTable definitions;
   size_t fileFrames = 0;  // made so far

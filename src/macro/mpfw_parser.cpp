@@ -5,7 +5,6 @@
 #include "lex/literals.h"
 #include "platform/console.h"
 #include "platform/system.h"
-#include "text/files.h"
 #include "text/paths.h"
 
 namespace qrex {
@@ -58,7 +57,8 @@ std::unique_ptr<MpfwSourceFile> MpfwParser::CreateSourceFile() { return std::mak
 MpfwSourceFile* MpfwParser::LoadSourceFile(const std::string& path, const std::string& extraText) {
   std::string text;
   // What is looked up is a plain file; a configuration may also come through a pipe.
-  if (!LoadStream(text, path)) throw LexScannerException("Couldn't open file " + path, current);
+  if (!context.rootFrame.World().sources->Read(text, path, SourceTexts::Form::Stream))
+    throw LexScannerException("Couldn't open file " + path, current);
   std::unique_ptr<MpfwSourceFile> made = CreateSourceFile();
   MpfwSourceFile& file = *made;
   file.path = path;
@@ -78,8 +78,7 @@ bool MpfwParser::ExpandSourceFile(MpfwSourceFile& file) {
   } catch (const LexScannerException& exception) {
     // One message for all files that led too deep.
     if (!m_isTooDeep || !m_isTooDeepTold) {
-      TraceWriter trace;
-      ReportParseError(context.sourceFiles, trace, exception);
+      context.rootFrame.World().messages->Take(ParseErrorOf(context.sourceFiles, exception));
     }
     m_isTooDeepTold = m_isTooDeep;
     return false;
@@ -213,8 +212,7 @@ void MpfwParser::ParseImported(MpfwSourceFile& file, MpfwParser& parser, void (*
       return parser.current;
     } catch (LexScannerException& exception) {
       MapErrorPosition(file.map, expansion, exception);
-      TraceWriter trace;
-      ReportParseError(context.sourceFiles, trace, exception);
+      context.rootFrame.World().messages->Take(ParseErrorOf(context.sourceFiles, exception));
       throw LexScannerException("while processing @import of " + file.path, m_importBegin);
     }
   }();

@@ -77,18 +77,26 @@ void MapErrorPosition(const SourceMap& map, const TextRange& output, LexScannerE
   exception.position = MapOutputOffset(map, std::min<int64_t>(exception.position - output.begin, last));
 }
 
-bool FindSourceLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line) {
+bool FindSourcePlace(const SourceFileList& files, const char* position, SourcePlace& place) {
   if (!position) return false;
   for (const auto& file : files) {
     const TextRange text{std::string_view(file->text)};
     // What is missing from an empty expansion has no source of its own: it is missing at the end of the file.
     const bool isEmptyExpansion = file->expansion.empty() && position == file->expansion.data();
     if (!isEmptyExpansion && !text.Contains(position)) continue;
-    path = file->path;
-    line = LineOfPosition(text, isEmptyExpansion ? text.end : position);
+    const char* const begin = isEmptyExpansion ? text.end : position;
+    place = {file->path, LineOfPosition(text, begin), begin - text.begin, EndOfWord(text, begin) - text.begin};
     return true;
   }
   return false;
+}
+
+bool FindSourceLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line) {
+  SourcePlace place;
+  if (!FindSourcePlace(files, position, place)) return false;
+  path = std::move(place.file);
+  line = place.line;
+  return true;
 }
 
 bool FindExpandedLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line) {
@@ -126,15 +134,14 @@ bool IsAddedText(const SourceFileList& files, const char* position) {
   return false;
 }
 
-void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception) {
-  std::string path;
-  int64_t line;
-  writer << "\n";
-  if (FindSourceLine(files, exception.position, path, line)) writer << path << "(" << line << ") : ";
-  writer << exception.message << "\n" << Hint(exception.hint);
+Message ParseErrorOf(const SourceFileList& files, const LexScannerException& exception) {
+  Message message = Message(Severity::Error, {}, exception.message).Apart();
+  FindSourcePlace(files, exception.position, message.place);
+  if (!exception.hint.empty()) message.hints.push_back(exception.hint);
   if (const std::string_view added = AddedLine(files, exception.position); !added.empty()) {
-    writer << Hint("this line is none of the file, it stands on the command line: " + std::string(added));
+    message.hints.push_back("this line is none of the file, it stands on the command line: " + std::string(added));
   }
+  return message;
 }
 
 void ExpansionSink::MakeRoom() {

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "lex/token.h"
+#include "text/message.h"
 
 namespace qrex {
 
@@ -80,13 +81,14 @@ void MapErrorPosition(const SourceMap& map, const TextRange& output, LexScannerE
 
 struct MpfwSourceFile;
 using SourceFileList = std::vector<std::unique_ptr<MpfwSourceFile>>;
+bool FindSourcePlace(const SourceFileList& files, const char* position, SourcePlace& place);
 bool FindSourceLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
 // The same for a position in the expansion of one of the files.
 bool FindExpandedLine(const SourceFileList& files, const char* position, std::string& path, int64_t& line);
 // Whether a position in an expansion came of what the command line added to a file.
 bool IsAddedText(const SourceFileList& files, const char* position);
-// With its hint behind it, also on whether the place was added to the file by the command line.
-void ReportParseError(const SourceFileList& files, TextWriter& writer, const LexScannerException& exception);
+// Its hints also tell whether the place was added to the file by the command line.
+Message ParseErrorOf(const SourceFileList& files, const LexScannerException& exception);
 
 // The column at which the lines of an expansion begin. Most expansions are within a line, so that it is kept as a
 // place in the output and worked out when a line does begin.

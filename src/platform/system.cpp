@@ -16,11 +16,8 @@
 #include <cstdlib>
 #include <ctime>
 #include <exception>
-#include <string_view>
 
-#include "platform/console.h"
 #include "platform/file_system.h"
-#include "platform/tool_keeper.h"
 
 namespace qrex::platform {
 
@@ -95,94 +92,7 @@ std::string PathOnPath(const std::string& program) {
   return {};
 }
 
-// The batch file that marks a manifest's update is the one that this system has to carry out:
-// `@echo TEXT >"FILE"`, with %TIME% and %DATE%.
-int RunBatchFile(std::string path) {
-  std::replace(path.begin(), path.end(), '\\', '/');
-  std::string content;
-  if (!ReadFile(path, content)) return 1;
-  const size_t begin = content.find("@echo "), arrow = content.rfind(" >\""), end = content.rfind('"');
-  if (begin != 0 || arrow == std::string::npos || end <= arrow + 3) return 1;
-  std::string text = content.substr(6, arrow - 6);
-  std::string target = content.substr(arrow + 3, end - arrow - 3);
-  std::replace(target.begin(), target.end(), '\\', '/');
-  const LocalTime now = CurrentLocalTime();
-  auto replace = [&](std::string_view name, const std::string& value) {
-    const size_t at = text.find(name);
-    if (at != std::string::npos) text.replace(at, name.size(), value);
-  };
-  replace("%TIME%", std::to_string(now.hour) + ":" + std::to_string(now.minute) + ":" + std::to_string(now.second));
-  replace("%DATE%", std::to_string(now.day) + "/" + std::to_string(now.month) + "/" + std::to_string(now.year));
-  return !IsReadOnlyFile(target) && WriteFile(target, text + "\n") ? 0 : 1;
-}
-
-bool IsPlainInShell(char c) {
-  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || (c & 0x80) != 0 ||
-         std::string_view("_@%+=:,./-").find(c) != std::string_view::npos;
-}
-
-// The line for the shell, in which more characters have a meaning than in the interpreter that it was written for.
-std::string ForShell(std::string_view line) {
-  std::string text;
-  bool isQuoted = false, isWordStart = true;
-  for (; !line.empty(); line.remove_prefix(1)) {
-    const char c = line.front();
-    if (!isQuoted && isWordStart && (line.starts_with("1>") || line.starts_with("2>"))) {
-      const size_t length = line.starts_with("2>&1") ? 4 : 2;
-      text += line.substr(0, length);
-      line.remove_prefix(length - 1);
-      continue;
-    }
-    isWordStart = !isQuoted && (c == ' ' || c == '\t' || c == '\n' || c == '\r');
-    if (line.starts_with("\\\"")) {  // a tool's own way to write a quote
-      text += line.substr(0, 2);
-      line.remove_prefix(1);
-    } else if (c == '"') {
-      text += c;
-      isQuoted = !isQuoted;
-    } else if (isWordStart) {
-      text += ' ';
-    } else {
-      const bool hasMeaning =
-          isQuoted ? std::string_view("$`\\").find(c) != std::string_view::npos : !IsPlainInShell(c);
-      if (hasMeaning) text += '\\';
-      text += c;
-    }
-  }
-  return text;
-}
-
 }  // namespace
-
-int RunCommand(ToolKeeper& tools, const std::string& line) {
-  constexpr std::string_view kInterpreter = "cmd /c ";
-  constexpr std::string_view kCompiler = "gcc-4 ";
-  constexpr std::string_view kBatchEnd = ".bat\"";
-  std::string command =
-      line.compare(0, kInterpreter.size(), kInterpreter) == 0 ? line.substr(kInterpreter.size()) : line;
-  if (command.compare(0, kCompiler.size(), kCompiler) == 0 && PathOnPath("gcc-4").empty()) command.erase(3, 2);
-  if (command.size() > kBatchEnd.size() + 1 && command.front() == '"' &&
-      command.compare(command.size() - kBatchEnd.size(), kBatchEnd.size(), kBatchEnd) == 0) {
-    return RunBatchFile(command.substr(1, command.size() - 2));
-  }
-  FlushStdout();
-  return tools.Run(ForShell(command));
-}
-
-NoInterpreter WhyNoInterpreter() {
-  switch (errno) {
-    case ENOENT:
-      return NoInterpreter::NotFound;
-    case E2BIG:
-      return NoInterpreter::LineTooLong;
-    case ENOEXEC:
-      return NoInterpreter::NotAProgram;
-    case ENOMEM:
-      return NoInterpreter::NoMemory;
-    default:
-      return NoInterpreter::OtherCause;
-  }
-}
 
 std::optional<std::string> EnvironmentValue(const char* name) {
   const char* const value = std::getenv(name);

@@ -1,4 +1,4 @@
-// Clock, identifiers, processes.
+// Clock, identifiers, the process itself.
 #pragma once
 
 #include <array>
@@ -9,21 +9,12 @@
 
 namespace qrex::platform {
 
-class ToolKeeper;
-
 int64_t SystemFileTime();         // 100 ns units since 1601
 uint64_t PerformanceCounter();    // monotonic
 uint64_t PerformanceFrequency();  // counts per second
 
 std::array<uint8_t, 16> MakeUuid();  // random, in network byte order
 
-// Runs a line through the command interpreter; its exit code, or -1. "cmd /c REST" runs REST. The line has the form of
-// that interpreter: "..." is taken literally, and outside of it 1>FILE, 2>FILE and 2>&1 redirect; nothing else has a
-// meaning, so that a line runs the one tool that it begins with.
-int RunCommand(ToolKeeper& tools, const std::string& line);
-// Why RunCommand, just now, gave -1.
-enum class NoInterpreter { NotFound, LineTooLong, NotAProgram, NoMemory, OtherCause };
-NoInterpreter WhyNoInterpreter();
 std::optional<std::string> EnvironmentValue(const char* name);
 void SetEnvironment(const std::string& name, const std::string& value);
 constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH

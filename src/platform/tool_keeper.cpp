@@ -15,6 +15,7 @@
 #include <cstdint>
 #include <cstdio>
 #include <cstdlib>
+#include <cstring>
 #include <ctime>
 #include <map>
 #include <set>
@@ -24,15 +25,20 @@ namespace qrex::platform {
 
 namespace {
 
+constexpr int kNotRun = 127;
 constexpr int kEndedBySignal = 128;  // plus the signal, as the shell has it
 
-// A request is its size and the line and the environment as strings that end in 0; an empty one says goodbye. Each is
-// answered by a Reply, in the order in which the tools end.
-struct Reply {
-  uint32_t request = 0;  // its number, from 0
-  int32_t error = 0;     // why the tool could not be started
-  int32_t status = 0;    // as `waitpid` tells it
+// Ahead of each request. Behind it stand `size` bytes: the program, its words and its environment as strings that end
+// in 0. The descriptors of the streams travel with it.
+struct RequestHead {
+  enum class Kind : uint32_t { RunTool, EndTools, Goodbye };
+  Kind kind = Kind::RunTool;
+  uint32_t number = 0;
+  uint32_t size = 0;
+  uint32_t words = 0;  // how many of the strings behind the first are words
+  bool hasOutput = false, hasErrors = false, errorsIntoOutput = false;
 };
+constexpr size_t kMostStreams = 2;
 
 bool SendAll(int socket, const void* data, size_t size) {
   for (const char* at = static_cast<const char*>(data); size > 0;) {
@@ -56,7 +62,56 @@ bool ReceiveAll(int socket, void* data, size_t size) {
   return true;
 }
 
-int CodeOf(int status) { return WIFEXITED(status) ? WEXITSTATUS(status) : kEndedBySignal + WTERMSIG(status); }
+// The ancillary data of a message: descriptors, of which the receiver gets its own.
+struct StreamsInMessage {
+  alignas(cmsghdr) char space[CMSG_SPACE(kMostStreams * sizeof(int))] = {};
+};
+
+bool SendHead(int socket, const RequestHead& head, const std::vector<int>& streams) {
+  RequestHead copy = head;
+  iovec data = {&copy, sizeof copy};
+  StreamsInMessage control;
+  msghdr message = {};
+  message.msg_iov = &data;
+  message.msg_iovlen = 1;
+  if (!streams.empty()) {
+    message.msg_control = control.space;
+    message.msg_controllen = CMSG_SPACE(streams.size() * sizeof(int));
+    cmsghdr* const header = CMSG_FIRSTHDR(&message);
+    header->cmsg_level = SOL_SOCKET;
+    header->cmsg_type = SCM_RIGHTS;
+    header->cmsg_len = CMSG_LEN(streams.size() * sizeof(int));
+    std::memcpy(CMSG_DATA(header), streams.data(), streams.size() * sizeof(int));
+  }
+  ssize_t sent;
+  do {
+    sent = sendmsg(socket, &message, MSG_NOSIGNAL);
+  } while (sent < 0 && errno == EINTR);
+  if (sent <= 0) return false;
+  return SendAll(socket, reinterpret_cast<const char*>(&copy) + sent, sizeof copy - static_cast<size_t>(sent));
+}
+
+bool ReceiveHead(int socket, RequestHead& head, std::vector<Descriptor>& streams) {
+  iovec data = {&head, sizeof head};
+  StreamsInMessage control;
+  msghdr message = {};
+  message.msg_iov = &data;
+  message.msg_iovlen = 1;
+  message.msg_control = control.space;
+  message.msg_controllen = sizeof control.space;
+  ssize_t got;
+  do {
+    got = recvmsg(socket, &message, MSG_CMSG_CLOEXEC);
+  } while (got < 0 && errno == EINTR);
+  if (got <= 0) return false;
+  for (cmsghdr* header = CMSG_FIRSTHDR(&message); header; header = CMSG_NXTHDR(&message, header)) {
+    int numbers[kMostStreams];
+    const size_t count = (header->cmsg_len - CMSG_LEN(0)) / sizeof(int);
+    std::memcpy(numbers, CMSG_DATA(header), count * sizeof(int));
+    for (size_t i = 0; i < count; ++i) streams.emplace_back(numbers[i]);
+  }
+  return ReceiveAll(socket, reinterpret_cast<char*>(&head) + got, sizeof head - static_cast<size_t>(got));
+}
 
 // --- The keeper's side
 
@@ -112,12 +167,7 @@ class Keeper {
         SendReplies();
       }
       if (events[0].revents == 0) continue;
-      uint32_t size;
-      if (!ReceiveAll(m_socket, &size, sizeof size)) return EndChildren(Which::All);
-      if (size == 0) return;
-      std::string request(size, '\0');
-      if (!ReceiveAll(m_socket, request.data(), size)) return EndChildren(Which::All);
-      StartTool(request);
+      if (!Answer()) return;
       SendReplies();
     }
   }
@@ -125,36 +175,62 @@ class Keeper {
  private:
   enum class Which { Orphans, All };
 
-  void StartTool(std::string& request) {
-    const uint32_t number = m_nextRequest++;
-    std::vector<char*> environment;
-    for (size_t at = request.find('\0') + 1; at < request.size(); at = request.find('\0', at) + 1) {
-      environment.push_back(&request[at]);
+  // What is asked for next; false: nothing will be any more.
+  bool Answer() {
+    RequestHead head;
+    std::vector<Descriptor> streams;
+    const bool isAsked = ReceiveHead(m_socket, head, streams);
+    if (isAsked && head.kind == RequestHead::Kind::RunTool) {
+      std::string text(head.size, '\0');
+      if (ReceiveAll(m_socket, text.data(), head.size)) {
+        StartTool(head, text, streams);
+        return true;
+      }
     }
-    environment.push_back(nullptr);
+    if (!isAsked || head.kind != RequestHead::Kind::Goodbye || !m_tools.empty()) EndChildren(Which::All);
+    return isAsked && head.kind == RequestHead::Kind::EndTools;
+  }
+
+  void StartTool(const RequestHead& head, std::string& text, const std::vector<Descriptor>& streams) {
+    std::vector<char*> strings;  // the program, its words, null, its environment, null
+    for (size_t at = 0; at < text.size(); at = text.find('\0', at) + 1) {
+      if (strings.size() == 1 + head.words) strings.push_back(nullptr);
+      strings.push_back(&text[at]);
+    }
+    if (strings.size() == 1 + head.words) strings.push_back(nullptr);
+    strings.push_back(nullptr);
     int failure[2];  // closed by the start of the tool, else gets the error
-    if (pipe2(failure, O_CLOEXEC) != 0) return m_replies.push_back({number, errno, 0});
+    if (pipe2(failure, O_CLOEXEC) != 0) return m_replies.push_back({head.number, errno, 0});
     const pid_t keeper = getpid();
     const pid_t process = fork();
-    if (process == 0) Become(request.data(), environment.data(), keeper, failure[1]);
+    if (process == 0) {
+      if (!Prepare(head, streams, keeper)) _exit(kNotRun);
+      environ = &strings[head.words + 2];
+      execvp(strings[0], &strings[1]);
+      const int error = errno;
+      [[maybe_unused]] const ssize_t told = write(failure[1], &error, sizeof error);
+      _exit(kNotRun);
+    }
     int error = process < 0 ? errno : 0;
     close(failure[1]);
     if (process > 0 && read(failure[0], &error, sizeof error) == sizeof error) waitpid(process, nullptr, 0);
     close(failure[0]);
-    if (error != 0) return m_replies.push_back({number, error, 0});
-    m_tools[process] = number;
+    if (error != 0) return m_replies.push_back({head.number, error, 0});
+    m_tools[process] = head.number;
   }
 
-  [[noreturn]] void Become(char* line, char** environment, pid_t keeper, int failure) {
+  // The new process ahead of its program. False: the run is over.
+  bool Prepare(const RequestHead& head, const std::vector<Descriptor>& streams, pid_t keeper) const {
     prctl(PR_SET_PDEATHSIG, SIGKILL);
-    if (getppid() != keeper || setpgid(0, m_toolGroup) != 0) _exit(127);  // the run is over
+    prctl(PR_SET_CHILD_SUBREAPER, 1);
+    if (getppid() != keeper || setpgid(0, m_toolGroup) != 0) return false;
     sigprocmask(SIG_SETMASK, &m_toolMask, nullptr);
-    char shell[] = "sh", option[] = "-c";
-    char* const arguments[] = {shell, option, line, nullptr};
-    execve("/bin/sh", arguments, environment);
-    const int error = errno;
-    [[maybe_unused]] const ssize_t told = write(failure, &error, sizeof error);
-    _exit(127);
+    dup2(open("/dev/null", O_RDONLY | O_CLOEXEC), STDIN_FILENO);
+    auto stream = streams.begin();
+    if (head.hasOutput) dup2((stream++)->Number(), STDOUT_FILENO);
+    if (head.hasErrors) dup2((stream++)->Number(), STDERR_FILENO);
+    if (head.errorsIntoOutput) dup2(STDOUT_FILENO, STDERR_FILENO);
+    return true;
   }
 
   // Takes notice of the children that ended; whether a signal ended a tool.
@@ -166,7 +242,8 @@ class Keeper {
       if (tool == m_tools.end()) continue;
       m_replies.push_back({tool->second, 0, status});
       m_tools.erase(tool);
-      wasKilled = wasKilled || CodeOf(status) > kEndedBySignal;
+      // A shell that waited for its program tells its end so.
+      wasKilled = wasKilled || WIFSIGNALED(status) || WEXITSTATUS(status) > kEndedBySignal;
     }
     return wasKilled;
   }
@@ -196,7 +273,7 @@ class Keeper {
   }
 
   void SendReplies() {
-    for (const Reply& reply : m_replies) SendAll(m_socket, &reply, sizeof reply);
+    for (const ToolReply& reply : m_replies) SendAll(m_socket, &reply, sizeof reply);
     m_replies.clear();
   }
 
@@ -204,95 +281,60 @@ class Keeper {
   const pid_t m_toolGroup;
   int m_childEnds = -1;
   sigset_t m_toolMask;
-  uint32_t m_nextRequest = 0;
   std::map<pid_t, uint32_t> m_tools;  // that run, with the numbers of their requests
-  std::vector<Reply> m_replies;       // not sent yet
-};
-
-// --- This process
-
-volatile std::sig_atomic_t interruptedBy = 0;
-
-// An interrupt is noted while a tool runs: the tool got it as well, and what it leaves has to be cleared away.
-class InterruptWatch {
- public:
-  InterruptWatch() {
-    interruptedBy = 0;
-    for (size_t i = 0; i < 2; ++i) {
-      struct sigaction noted = {};
-      noted.sa_handler = [](int signal) { interruptedBy = signal; };
-      noted.sa_flags = SA_RESTART;
-      sigaction(kSignals[i], nullptr, &m_before[i]);
-      if (m_before[i].sa_handler != SIG_IGN) sigaction(kSignals[i], &noted, nullptr);
-    }
-  }
-  ~InterruptWatch() {
-    for (size_t i = 0; i < 2; ++i) sigaction(kSignals[i], &m_before[i], nullptr);
-  }
-  InterruptWatch(const InterruptWatch&) = delete;
-  InterruptWatch& operator=(const InterruptWatch&) = delete;
-  static int Signal() { return interruptedBy; }
-
- private:
-  static constexpr int kSignals[] = {SIGINT, SIGQUIT};
-  struct sigaction m_before[2];
+  std::vector<ToolReply> m_replies;   // not sent yet
 };
 
 }  // namespace
 
-bool ToolKeeper::Start() {
-  if (m_process > 0) return true;
+// --- This process
+
+std::unique_ptr<ToolKeeper> ToolKeeper::Start() {
   int sockets[2];
-  if (socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, sockets) != 0) return false;
+  if (socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, sockets) != 0) return nullptr;
+  Descriptor ours(sockets[0]), theirs(sockets[1]);
   const pid_t group = getpgrp();
-  m_process = fork();
-  if (m_process == 0) {
-    close(sockets[0]);
-    Keeper(sockets[1], group).Serve();
+  const pid_t process = fork();
+  if (process == 0) {
+    ours.Close();
+    Keeper(theirs.Number(), group).Serve();
     _exit(0);
   }
   const int error = errno;
-  close(sockets[1]);
-  m_socket = sockets[0];
-  if (m_process > 0) return true;
-  close(m_socket);
+  theirs.Close();
+  if (process > 0) return std::unique_ptr<ToolKeeper>(new ToolKeeper(process, std::move(ours)));
+  ours.Close();
   errno = error;
-  return false;
+  return nullptr;
 }
 
-int ToolKeeper::Ask(const std::string& shellLine) {
-  std::string request = shellLine + '\0';
-  for (char** entry = environ; *entry; ++entry) request.append(*entry).push_back('\0');
-  const uint32_t size = static_cast<uint32_t>(request.size());
-  Reply reply;
-  if (!SendAll(m_socket, &size, sizeof size) || !SendAll(m_socket, request.data(), size) ||
-      !ReceiveAll(m_socket, &reply, sizeof reply)) {
-    WaitForEnd();  // without goodbye it ends the tool, unless it was killed, which the tool does not outlive either
-    return kEndedBySignal + SIGKILL;
-  }
-  errno = reply.error;
-  return reply.error != 0 ? -1 : CodeOf(reply.status);
-}
-
-int ToolKeeper::Run(const std::string& shellLine) {
-  if (!Start()) return -1;
-  const InterruptWatch watch;
-  const int code = Ask(shellLine);
-  return watch.Signal() != 0 ? kEndedBySignal + watch.Signal() : code;
-}
-
-void ToolKeeper::Stop() {
-  if (m_process <= 0) return;
-  const uint32_t goodbye = 0;
-  SendAll(m_socket, &goodbye, sizeof goodbye);
-  WaitForEnd();
-}
-
-void ToolKeeper::WaitForEnd() {
-  close(m_socket);
+ToolKeeper::~ToolKeeper() {
+  if (!m_isBroken) SendHead(Socket(), {.kind = RequestHead::Kind::Goodbye}, {});
+  m_socket.Close();
   while (waitpid(m_process, nullptr, 0) < 0 && errno == EINTR) {
   }
-  m_process = m_socket = -1;
 }
+
+bool ToolKeeper::Ask(const ToolRequest& request) {
+  std::string text = request.program + '\0';
+  for (const std::string& word : request.words) text.append(word).push_back('\0');
+  for (char** entry = environ; *entry; ++entry) text.append(*entry).push_back('\0');
+  std::vector<int> streams;
+  for (const int stream : {request.output, request.errors}) {
+    if (stream >= 0) streams.push_back(stream);
+  }
+  const RequestHead head = {.number = request.number,
+                            .size = static_cast<uint32_t>(text.size()),
+                            .words = static_cast<uint32_t>(request.words.size()),
+                            .hasOutput = request.output >= 0,
+                            .hasErrors = request.errors >= 0,
+                            .errorsIntoOutput = request.errorsIntoOutput};
+  m_isBroken = !SendHead(Socket(), head, streams) || !SendAll(Socket(), text.data(), text.size());
+  return !m_isBroken;
+}
+
+bool ToolKeeper::EndTools() { return SendHead(Socket(), {.kind = RequestHead::Kind::EndTools}, {}); }
+
+bool ToolKeeper::Receive(ToolReply& reply) { return ReceiveAll(Socket(), &reply, sizeof reply); }
 
 }  // namespace qrex::platform

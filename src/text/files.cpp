@@ -177,9 +177,6 @@ platform::Result ReadWholeFile(std::string& out, const std::string& path) {
   return platform::ReadFile(Checked(path), out);
 }
 
-namespace {
-
-// In place: CR LF and a lone CR become LF.
 void FoldLineEnds(std::string& text) {
   const char* const end = text.data() + text.size();
   auto findReturn = [end](const char* from) {
@@ -199,8 +196,6 @@ void FoldLineEnds(std::string& text) {
   }
   text.resize(static_cast<size_t>(to - text.data()));
 }
-
-}  // namespace
 
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds) {
   std::string text;

@@ -50,6 +50,7 @@ platform::Result FullPathOf(const std::string& path, std::string& out);
 platform::Result RealPathOf(const std::string& path, std::string& out);  // as FullPathOf, with symbolic links resolved
 platform::Result ReadWholeFile(std::string& out, const std::string& path);
 bool LoadText(std::string& out, const std::string& path, bool foldLineEnds);  // CR LF and lone CR to LF when folding
+void FoldLineEnds(std::string& text);                                         // in place: CR LF and a lone CR become LF
 bool LoadStream(std::string& out, const std::string& path);  // as LoadText with folding, also from a pipe or device
 
 // Removes what killed runs left where they were writing. One for each run: it looks through each folder once.

@@ -43,7 +43,7 @@ std::vector<std::string> ImportCandidates(const ConfigSettings& settings, const 
 bool FindImport(const ConfigSettings& settings, const std::string& path, std::string& found) {
   if (!platform::IsValidUtf8(path)) return false;
   for (std::string& candidate : ImportCandidates(settings, path)) {
-    if (!FileExists(candidate)) continue;
+    if (!settings.macroWorld.sources->Has(candidate)) continue;
     found = std::move(candidate);
     return true;
   }
@@ -63,7 +63,7 @@ std::string TriedInTree(const ConfigSettings& settings, const std::string& path)
 bool FindInTree(const ConfigSettings& settings, const std::string& path, std::string& root, std::string& fullPath) {
   for (const std::string& candidate : settings.virtualTree) {
     fullPath = PathJoin(candidate, path);
-    if (!FileExists(fullPath)) continue;
+    if (!settings.macroWorld.sources->Has(fullPath)) continue;
     root = candidate;
     return true;
   }

@@ -7,8 +7,8 @@
 #include <vector>
 
 #include "macro/mpfw_parser.h"
+#include "platform/process.h"
 #include "platform/system.h"
-#include "platform/tool_keeper.h"
 #include "text/files.h"
 #include "text/output_notes.h"
 #include "workspace/compilers.h"
@@ -16,6 +16,7 @@
 namespace qrex {
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
+enum class RuntimeChoice { None, Source, Built };
 
 struct PlatformEnvironment {
   std::string PATH, INCLUDE, LIB;  // `;`-separated lists
@@ -38,6 +39,8 @@ struct ConfigSettings {
   bool diagnostics = false;
   CompilerKind compiler = CompilerKind::vc8;
   bool targetXP = false;
+  std::string platformToolset;  // of .vcxproj files, instead of the compiler's; set: projects may name theirs
+  std::string windowsSdk;       // beside it; empty: the newest
   bool translateOnly = false;
   bool rebuildAll = false;
   bool writeTokenEquivalent = true;
@@ -48,16 +51,18 @@ struct ConfigSettings {
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
   bool compilableText = false;
+  RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   // Whoever may read the settings may write files and run tools.
   mutable LeftoverSweep leftovers;
   mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
-  mutable platform::ToolKeeper tools;
+  mutable platform::Processes tools;
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
 
+  void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };
 

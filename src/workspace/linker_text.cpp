@@ -194,7 +194,7 @@ void ForEachSwitch(const ProjectConfig& config, std::string_view tool, bool allo
 std::string DependencyText(const Project& project, const ProjectConfig& config) {
   std::set<std::string> libraries;
   GatherLibraries(project, config, {.skipDefaultLibraries = true, .forBuild = false}, libraries);
-  const bool isListOfItems = CompilerOf(project.settings->compiler).format == ProjectFormat::Vcxproj;
+  const bool isListOfItems = CompilerOf(project.settings->compiler).Writes(ProjectFormat::Vcxproj);
   std::string text;
   for (const std::string& library : libraries) {
     if (isListOfItems) {

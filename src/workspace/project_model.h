@@ -45,6 +45,7 @@ struct ProjectConfig {
   std::vector<std::string> tags;
   BuildEvent preBuildEvent, preLinkEvent, postBuildEvent;
   std::map<std::string, std::string> generalOptions;
+  std::string platformToolset;  // empty: that of the settings
   OptionMap compilerOptions;
   OptionMap resourceOptions;
   std::string compilerText;  // raw switches of +cpp for vc6 and the gcc family

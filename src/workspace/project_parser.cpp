@@ -16,8 +16,9 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   auto made = std::make_unique<MpfwSourceFile>();
   MpfwSourceFile& file = *made;
   if (!FindInTree(*project.settings, path, project.rootDir, project.filePath) ||
-      !LoadText(file.text, project.filePath, true)) {
-    TraceWriter() << "Error: Couldn't open project file " << path << "\n" << Hint(TriedInTree(*project.settings, path));
+      !project.settings->macroWorld.sources->Read(file.text, project.filePath)) {
+    project.settings->Tell(Message(Severity::Error, "Error: ", "Couldn't open project file " + path)
+                               .WithHint(TriedInTree(*project.settings, path)));
     return false;
   }
   file.path = project.filePath;
@@ -35,8 +36,7 @@ bool LoadProjectFile(Project& project, const std::string& path) {
   } catch (LexScannerException& exception) {
     MapErrorPosition(file.map, expansion, exception);
     if (exception.hint.empty() && parser.MayLackBrace()) exception.hint = parser.BlockHint();
-    TraceWriter trace;
-    ReportParseError(project.settings->sourceFiles, trace, exception);
+    project.settings->macroWorld.messages->Take(ParseErrorOf(project.settings->sourceFiles, exception));
     project.Empty();
   }
   return !project.hasFaultyFile;
@@ -234,36 +234,52 @@ void ProjectParser::ParseBuildEvent(BuildEvent ProjectConfig::*event) {
   for (ProjectConfig* config : configs) config->*event = read;
 }
 
+namespace {
+
+constexpr std::string_view kGeneralKeys[] = {"OutputDirectory",
+                                             "IntermediateDirectory",
+                                             "DeleteExtensionsOnClean",
+                                             "BuildLogFile",
+                                             "InheritedPropertySheets",
+                                             "ConfigurationType",
+                                             "UseOfMFC",
+                                             "UseOfATL",
+                                             "ATLMinimizesCRunTimeLibraryUsage",
+                                             "CharacterSet",
+                                             "ManagedExtensions",
+                                             "WholeProgramOptimization"};
+constexpr std::string_view kToolsetKey = "PlatformToolset";
+
+}  // namespace
+
+std::string ProjectParser::ReadGeneralKey() {
+  if (current.kind != kIdentifier) {
+    throw LexScannerException("Expected identifier when read " + Printed(current), current);
+  }
+  const std::string key = current.text.Text();
+  const bool isToolset = key == kToolsetKey;
+  if (isToolset ? m_project.settings->platformToolset.empty()
+                : std::find(std::begin(kGeneralKeys), std::end(kGeneralKeys), key) == std::end(kGeneralKeys)) {
+    throw LexScannerException("Invalid key " + Printed(current), current)
+        .WithHint(isToolset ? "a key where the configuration sets platformToolset" : "");
+  }
+  Advance();
+  return key;
+}
+
 void ProjectParser::ParseGeneral() {
-  static constexpr std::string_view kKeys[] = {"OutputDirectory",
-                                               "IntermediateDirectory",
-                                               "DeleteExtensionsOnClean",
-                                               "BuildLogFile",
-                                               "InheritedPropertySheets",
-                                               "ConfigurationType",
-                                               "UseOfMFC",
-                                               "UseOfATL",
-                                               "ATLMinimizesCRunTimeLibraryUsage",
-                                               "CharacterSet",
-                                               "ManagedExtensions",
-                                               "WholeProgramOptimization"};
   Advance();
   const Configs configs = ReadScope().configs;
   RequireBrace();
   while (current.kind != kCloseBrace) {
-    if (current.kind != kIdentifier) {
-      throw LexScannerException("Expected identifier when read " + Printed(current), current);
-    }
-    if (std::find(std::begin(kKeys), std::end(kKeys), current.text.View()) == std::end(kKeys)) {
-      throw LexScannerException("Invalid key " + Printed(current), current);
-    }
-    const std::string key = current.text.Text();
-    Advance();
+    const std::string key = ReadGeneralKey();
     Expect(kAssign, "=");
     std::string value;
     ReadString(value);
     Advance();
-    for (ProjectConfig* config : configs) config->generalOptions[key] = ForConfig(value, *config);
+    for (ProjectConfig* config : configs) {
+      (key == kToolsetKey ? config->platformToolset : config->generalOptions[key]) = ForConfig(value, *config);
+    }
   }
   Advance();
 }

@@ -43,6 +43,7 @@ class ProjectParser : public MpfwParser {
   void ParseSubprojects();
   void ParseToolFiles();
   void ParseBuildEvent(BuildEvent ProjectConfig::*event);
+  std::string ReadGeneralKey();
   void ParseGeneral();
   bool ParseOptions(bool add);
   struct Scope {

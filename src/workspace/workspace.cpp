@@ -57,7 +57,7 @@ Project* Workspace::LoadProject(const std::string& path) {
   m_byName.emplace(project.name, &project);
   if (!isRead) return nullptr;
   if (m_loadDepth >= kMaxLoadDepth || platform::IsStackShort()) {
-    TraceWriter() << "Error: Subprojects nested too deeply at " << path << "\n";
+    settings.Tell(Message(Severity::Error, "Error: ", "Subprojects nested too deeply at " + path));
     return nullptr;
   }
   ++m_loadDepth;
@@ -218,14 +218,12 @@ bool Workspace::CheckFileReferences() {
       const auto [entry, isNew] = fileMap.emplace(file->path, file);
       if (isNew) continue;
       const Project& other = *entry->second->project;
-      TraceWriter trace;
-      if (&other == project.get()) {
-        trace << "ERROR:  Project " << project->rootToProjDir << " contains duplicate reference to file " << file->path
-              << "\n";
-      } else {
-        trace << "ERROR:  Projects " << other.rootToProjDir << " and " << project->rootToProjDir
-              << " both reference file " << file->path << "\n";
-      }
+      const std::string text =
+          &other == project.get()
+              ? "Project " + other.rootToProjDir + " contains duplicate reference to file " + file->path
+              : "Projects " + other.rootToProjDir + " and " + project->rootToProjDir + " both reference file " +
+                    file->path;
+      settings.Tell(Message(Severity::Error, "ERROR:  ", text));
       return false;
     }
   }

@@ -80,10 +80,7 @@ void WorkspaceParser::ParseNested(const std::string& path) {
     nested.ParseWorkspace();
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);
-    {
-      TraceWriter trace;
-      ReportParseError(context.sourceFiles, trace, exception);
-    }
+    context.rootFrame.World().messages->Take(ParseErrorOf(context.sourceFiles, exception));
     throw LexScannerException("while reading workspace file " + path, previous);
   }
 }

@@ -81,7 +81,7 @@ TEST_F(DependencyTest, Bytes) {
   EXPECT_TRUE(builder->dependencyFileLoaded);
   EXPECT_FALSE(builder->registerMap.dirty || builder->unregisterMap.dirty);
   EXPECT_EQ(&Scanned("lib/l.h"), Scanned("app/a.h").imports.at(0));
-  EXPECT_EQ(0x0102030405060708, Scanned("app/a.h").translationTime);
+  EXPECT_EQ(0x0102030405060708, Scanned("app/a.h").times.translation);
   EXPECT_TRUE(Scanned("app/a.h").hasDeclarations && !Scanned("app/b.h").hasDeclarations);
   EXPECT_EQ(payload, DependencyPayload(*builder));
   builder->registerMap.dirty = true;
@@ -194,13 +194,13 @@ TEST_F(DependencyTest, RegisteringFiles) {
   Scanned("app/b.h").file.pairedSource = &Scanned("app/y.cpp").file;
   Scanned("app/c.h").file.pairedSource = &x.file;
   MarkRegistered(x);
-  EXPECT_TRUE(x.registered && Scanned("app/a.h").registered && Scanned("app/c.h").registered);
-  EXPECT_FALSE(Scanned("app/b.h").registered || Scanned("lib/l.h").registered);
+  EXPECT_TRUE(x.tail.isRegistered && Scanned("app/a.h").tail.isRegistered && Scanned("app/c.h").tail.isRegistered);
+  EXPECT_FALSE(Scanned("app/b.h").tail.isRegistered || Scanned("lib/l.h").tail.isRegistered);
   ScannedFile& y = Scanned("app/y.cpp");
   y.imports = {&Scanned("app/b.h")};
-  y.registered = true;
+  y.tail.isRegistered = true;
   MarkRegistered(y);
-  EXPECT_FALSE(Scanned("app/b.h").registered);
+  EXPECT_FALSE(Scanned("app/b.h").tail.isRegistered);
 
   DeclarationRegistry registry(true);
   registry.Update("x.cpp", {});
@@ -218,12 +218,7 @@ TEST_F(DependencyTest, RegisteringFiles) {
 TEST_F(DependencyTest, Paths) {
   EXPECT_EQ("qrexsource/x64/Debug", TranslationDirectory(builder->config));
   EXPECT_EQ("qrexsource/x64/Debug/app.qrexdep", DependencyFilePath(App(), builder->config));
-  EXPECT_EQ("x64/Debug/app lib/x64/Debug", builder->IntermediateDirectory() + " " + builder->LibraryDirectory());
-  const guid id = MakeGuid();
-  std::string owner;
-  EXPECT_TRUE(builder->RegisterGuid(id, "a", owner));
-  EXPECT_FALSE(builder->RegisterGuid(id, "b", owner));
-  EXPECT_EQ("a", owner);
+  EXPECT_EQ("x64/Debug/app lib/x64/Debug", builder->paths.Intermediate() + " " + builder->paths.Library());
 }
 
 }  // namespace

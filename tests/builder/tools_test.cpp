@@ -4,9 +4,7 @@
 
 #include "builder/tools.h"
 
-#include "builder/run_command.h"
 #include "builder/tool_output.h"
-#include "message_of.h"
 #include "text/paths.h"
 #include "translator/file/translate_file.h"
 #include "workspace/switch_blocks.h"
@@ -47,13 +45,22 @@ class ToolsTest : public WorldTest {
   ScannedFile& Source(const std::string& name) {
     return builder->GetScannedFile(*App().filesByPath.at("app/src/" + name));
   }
+  bool Make(std::unique_ptr<BuildStep> step) {
+    bool made = false;
+    builder->scheduler.Add(std::move(step), [&made](bool succeeded) { made = succeeded; });
+    return made;
+  }
+  bool MakeObject(const std::string& name) { return Make(ObjectStep(*builder, Source(name))); }
+  bool Link(std::vector<std::string> inputs) {
+    return Make(TargetStep(*builder, builder->paths.Target(), std::move(inputs)));
+  }
   // A builder of the project, with its files.
   ProjectBuilder& Builder(CompilerKind compiler) {
     settings.compiler = compiler;
     StartBuild();
     App().CollectFiles();
     for (ProjectFile* file : App().files) builder->scanned.push_back(&builder->GetScannedFile(*file));
-    CreateDirectories(builder->IntermediateDirectory(), true);
+    CreateDirectories(builder->paths.Intermediate(), true);
     trace.clear();
     return *builder;
   }
@@ -61,67 +68,6 @@ class ToolsTest : public WorldTest {
  private:
   std::string m_path;
 };
-
-// --- Commands
-
-TEST_F(ToolsTest, RunCommandAnswersAsTheOptionsSay) {
-  std::string output, errors;
-  int code;
-  const CommandOptions capture{.output = &output, .errors = &errors};
-  ASSERT_TRUE(RunCommand(settings.tools, "cmd /c exit 3", code, {}));
-  ASSERT_EQ(3, code);
-  ASSERT_EQ("", trace);
-  AddTool("both", "printf 'a\\r\\nb'\nprintf oops >&2\n");
-  ASSERT_TRUE(RunCommand(settings.tools, "both", code, capture));
-  ASSERT_EQ("a\nb|oops|oops\n", output + "|" + errors + "|" + trace);
-  ASSERT_FALSE(FileExists("out1.txt") || FileExists("out2.txt"));
-  trace.clear();
-  ASSERT_TRUE(RunCommand(settings.tools, "both", code, {.echo = true, .output = &output, .errorsIntoOutput = true}));
-  ASSERT_EQ("a\nboops|both 1>out1.txt 2>&1\n", output + "|" + trace);
-  trace.clear();
-  ASSERT_FALSE(
-      RunCommand(settings.tools, "both", code, {.output = &output, .errors = &errors, .failOnErrorText = true}));
-  ASSERT_EQ("both 1>out1.txt 2>out2.txt\noops\n", trace);
-}
-
-TEST_F(ToolsTest, CommandsThatFail) {
-  AddTool("dies", "kill -ABRT $$\n");
-  Write("plain", "");
-  std::filesystem::create_directory("out2.txt");
-  std::string text;
-  const struct {
-    const char* command;
-    CommandOptions options;
-    const char* trace;
-  } cases[] = {
-      {"exit 7", {.failOnNonZero = true}, "exit 7\nReturn code : 7\n"},
-      {"exit 7", {.echo = true, .failOnNonZero = true}, "exit 7\nReturn code : 7\n"},
-      {"cmd /c nosuch x 2>/dev/null",
-       {.failOnNonZero = true},
-       "ERROR: nosuch was not found on PATH\ncmd /c nosuch x 2>/dev/null\nReturn code : 127\n"},
-      {"dies", {.failOnNonZero = true}, "ERROR: dies was ended by signal 6\ndies\nReturn code : 134\n"},
-      {"./plain 2>/dev/null",
-       {.failOnNonZero = true},
-       "ERROR: ./plain cannot be executed\n./plain 2>/dev/null\nReturn code : 126\n"},
-      {"true", {.errors = &text}, "true 2>out2.txt\nERROR getting stderr\n"},
-      {"rm out1.txt", {.output = &text}, "rm out1.txt 1>out1.txt\nERROR getting stdout\n"},
-  };
-  for (const auto& [command, options, expected] : cases) {
-    int code;
-    trace.clear();
-    EXPECT_FALSE(RunCommand(settings.tools, command, code, options)) << command;
-    EXPECT_EQ(expected, trace);
-  }
-}
-
-TEST_F(ToolsTest, InterruptedCommandsEndTheRun) {
-  AddTool("stopped", "kill -INT $$\n");
-  std::string output;
-  int code;
-  ASSERT_EQ("Interrupted while running stopped",
-            MessageOf([&] { RunCommand(settings.tools, "cmd /c stopped x", code, {.output = &output}); }));
-  ASSERT_FALSE(FileExists("out1.txt"));
-}
 
 // --- Compilers
 
@@ -146,7 +92,7 @@ TEST_F(ToolsTest, CompilerCommandLines) {
                                                         {CompilerKind::vc14, visualText("")}};
   for (const auto& [compiler, expected] : cases) {
     Builder(compiler);
-    ASSERT_TRUE(CompileFile(*builder, Source("x.cpp")));
+    ASSERT_TRUE(MakeObject("x.cpp"));
     ASSERT_EQ("", trace);
     ASSERT_EQ(expected, TakeLog());
     ASSERT_FALSE(FileExists("x64/Debug/app/compiler.rsp"));
@@ -154,7 +100,7 @@ TEST_F(ToolsTest, CompilerCommandLines) {
   app.usesQrex = false;
   settings.diagnostics = true;
   Builder(CompilerKind::clang);
-  CompileFile(*builder, Source("x.cpp"));
+  MakeObject("x.cpp");
   ASSERT_EQ(
       "Compiling app/src/x.cpp\nx64/Debug/app/compiler.rsp =  -g -DA=\"b c\" -I\"tree/app\" -I\"tree/app/src\""
       " -I\"tree\" -o \"x64/Debug/app/x.o\" \"tree/app/src/x.cpp\"\n"
@@ -166,18 +112,18 @@ TEST_F(ToolsTest, AssemblersAndResources) {
   Project& app = AddApp("Application", "\"x.asm\" \"r.rc\"");
   app.configs.front()->resourceOptions = {{"PreprocessorDefinitions", "A"}, {"ShowProgress", "true"}};
   Builder(CompilerKind::vc9);
-  ASSERT_TRUE(AssembleFile(*builder, Source("x.asm")));
+  ASSERT_TRUE(MakeObject("x.asm"));
   ASSERT_EQ(
       "ml /coff /c /Cx /nologo @x64/Debug/app/masm.rsp\n /Fo\"x64/Debug/app/\" "
       "\"qrexsource/x64/Debug/app/src/x.asm\"\n",
       TakeLog());
-  ASSERT_TRUE(CompileResource(*builder, Source("r.rc")));
+  ASSERT_TRUE(Make(ResourceStep(*builder, Source("r.rc"))));
   ASSERT_EQ("rc.exe /d A /v /fox64/Debug/app/r.res tree/app/src/r.rc\n", TakeLog());
   ASSERT_EQ("Compiling resource file app/src/r.rc\n", trace);
   Write("status", "4");
   settings.diagnostics = true;
   trace.clear();
-  ASSERT_FALSE(CompileResource(*builder, Source("r.rc")));
+  ASSERT_FALSE(Make(ResourceStep(*builder, Source("r.rc"))));
   ASSERT_EQ(
       "Compiling resource file app/src/r.rc\nrc.exe /d \"A\" /v  /fo\"x64/Debug/app/r.res\" \"tree/app/src/r.rc\"\n"
       "Return code : 4\n",
@@ -187,7 +133,7 @@ TEST_F(ToolsTest, AssemblersAndResources) {
   TakeLog();
   app.configs.front()->platform = "Win64";
   Builder(CompilerKind::vc9);
-  ASSERT_TRUE(AssembleFile(*builder, Source("x.asm")));
+  ASSERT_TRUE(MakeObject("x.asm"));
   ASSERT_TRUE(TakeLog().starts_with("ml64 /c /Cx /nologo @Win64/Debug/app/masm.rsp\n"));
   ASSERT_TRUE(
       trace.starts_with("Assembling app/src/x.asm\nWin64/Debug/app/masm.rsp =  /Fo\"Win64/Debug/app/\" "
@@ -223,10 +169,10 @@ TEST_F(ToolsTest, HostileNames) {
       StemOf(test.name, scanned->file.stem);
     }
     ScannedFile &resource = *builder->scanned[0], &source = *builder->scanned[1], &assembled = *builder->scanned[2];
-    if (CompileFile(*builder, source)) {
+    if (Make(ObjectStep(*builder, source))) {
       EXPECT_NE(std::string::npos, TakeLog().find(test.said));
     } else {
-      EXPECT_FALSE(AssembleFile(*builder, assembled) || CompileResource(*builder, resource));
+      EXPECT_FALSE(Make(ObjectStep(*builder, assembled)) || Make(ResourceStep(*builder, resource)));
       EXPECT_EQ(3, builder->errorCount);
       EXPECT_NE(std::string::npos, trace.find(test.said)) << trace;
       EXPECT_EQ("", TakeLog());
@@ -262,14 +208,29 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
     Builder(test.compiler);
     Write("say", test.output);
     Write("status", test.status);
-    const std::string object = ObjectPath(*builder, Source("x.cpp").file);
+    const std::string object = builder->paths.Object(Source("x.cpp").file);
     Write(object, "object");
-    EXPECT_EQ(test.succeeds, CompileFile(*builder, Source("x.cpp")));
+    EXPECT_EQ(test.succeeds, MakeObject("x.cpp"));
     EXPECT_EQ(test.errors, builder->errorCount);
     EXPECT_EQ(test.warnings, builder->warningCount);
     EXPECT_EQ(test.keepsObject, FileExists(object));
     EXPECT_NE(std::string::npos, trace.find(test.output));
   }
+}
+
+// One would take the other's place in the target.
+TEST_F(ToolsTest, OneObjectOfTwoSources) {
+  AddProject("app", "Application", "qrex { \"one\" { \"same.cpp\" } \"two\" { \"same.cpp\" } }");
+  Write("tree/app/one/same.cpp", "int a;\n");
+  Write("tree/app/two/same.cpp", "int b;\n");
+  settings.translateOnly = false;
+  StartBuild();
+  EXPECT_FALSE(builder->Build("app.qrexdep", nullptr));
+  EXPECT_EQ(1, builder->errorCount);
+  const std::string expected =
+      "ERROR: No object can be made of app/two/same.cpp : x64/Debug/app/same.o is that of app/one/same.cpp\n";
+  EXPECT_NE(std::string::npos, trace.find(expected)) << trace;
+  EXPECT_EQ(std::string::npos, trace.find("Linking"));
 }
 
 // --- Output
@@ -310,9 +271,9 @@ TEST_F(ToolsTest, MessagesAreCounted) {
   };
   for (const auto& test : cases) {
     Builder(test.compiler);
-    EXPECT_EQ(test.errors == 0, ScanToolOutput(*builder, test.text)) << test.text;
-    EXPECT_EQ(test.errors, builder->errorCount) << test.text;
-    EXPECT_EQ(test.warnings, builder->warningCount) << test.text;
+    const ToolMessages found = ScanToolOutput(*builder, test.text);
+    EXPECT_EQ(test.errors, found.errors) << test.text;
+    EXPECT_EQ(test.warnings, found.warnings) << test.text;
     EXPECT_EQ(test.text, trace);
   }
 }
@@ -329,8 +290,7 @@ TEST_F(ToolsTest, ManyMessagesInALineTakeLinearTime) {
     Builder(test.compiler);
     std::string text;
     for (int i = 0; i < kMessages; ++i) text += test.message;
-    EXPECT_FALSE(ScanToolOutput(*builder, text));
-    EXPECT_EQ(kMessages, builder->errorCount);
+    EXPECT_EQ(kMessages, ScanToolOutput(*builder, text).errors);
   }
 }
 
@@ -384,29 +344,24 @@ TEST_F(ToolsTest, VisualLinks) {
   app.configs.front()->linkerText = " /DLL x.obj \"$(Platform).lib\" /OUT:\"o $(Platform)/$(Configuration).dll\" /ltcg";
   app.configs.front()->generalOptions["WholeProgramOptimization"] = "1";
   Builder(CompilerKind::vc14);
-  ASSERT_EQ("lib/x64/Debug/app.dll", TargetPath(*builder));
-  ASSERT_TRUE(LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder)));
+  ASSERT_EQ("lib/x64/Debug/app.dll", builder->paths.Target());
+  ASSERT_TRUE(Link(CollectLinkInputs(*builder)));
   ASSERT_EQ(
       "link.exe @x64/Debug/app/linker.rsp\n /DLL /OUT:\"o x64/Debug.dll\" /ltcg \"x64/Debug/app/b.obj\""
       " \"x64/Debug/app/r.res\" \"x64/Debug/app/a.obj\" \"x64/Debug/app/c.obj\" \"x64.lib\" \"lib/x64/Debug/base.lib\""
-      " \"z.lib\"\n",
-      TakeLog());
-  ASSERT_EQ("Linking...\n", trace);
-  ASSERT_TRUE(EmbedManifest(*builder));
-  ASSERT_EQ(
+      " \"z.lib\"\n"
       "mt.exe @x64/Debug/app/mt.rsp /nologo\n/outputresource:\"lib/x64/Debug/app.dll\";#2 /manifest"
       " \"./x64/Debug/app/app.dll.intermediate.manifest\"\n\n",
       TakeLog());
+  ASSERT_EQ("Linking...\n", trace);
   ASSERT_TRUE(ReadText("x64/Debug/app/mt.dep").starts_with("Manifest resource last updated at "));
   ASSERT_FALSE(FileExists("x64/Debug/app/mt.rsp") || FileExists("x64/Debug/app/mtdep.bat"));
 
   app.configs.front()->linkerText = "/LTCG:STATUS";
   app.targetType = TargetType::StaticLibrary;
   Builder(CompilerKind::vc14);
-  ASSERT_TRUE(LinkTarget(*builder, TargetPath(*builder), {"a.obj", "$(Configuration).obj"}));
+  ASSERT_TRUE(Link({"a.obj", "$(Configuration).obj"}));
   ASSERT_EQ("lib.exe @x64/Debug/app/linker.rsp\n /LTCG:STATUS /LTCG \"a.obj\" \"Debug.obj\"\n", TakeLog());
-  ASSERT_TRUE(EmbedManifest(*builder));
-  ASSERT_EQ("", TakeLog());
   app.libraryIsStatic = true;
   const std::vector<std::string> inputs = CollectLinkInputs(*builder);
   ASSERT_EQ(3u, inputs.size());
@@ -416,16 +371,18 @@ TEST_F(ToolsTest, FailedLinks) {
   AddApp("Application", "");
   Write("status", "5");
   Builder(CompilerKind::vc14);
-  ASSERT_FALSE(LinkTarget(*builder, TargetPath(*builder), {"a.obj"}));
+  ASSERT_FALSE(Link({"a.obj"}));
   ASSERT_EQ(
       "Linking...\nlink.exe @\"x64/Debug/app/linker.rsp\"\nReturn code : 5\nx64/Debug/app/linker.rsp:  \"a.obj\"\n",
       trace);
   trace.clear();
-  ASSERT_FALSE(EmbedManifest(*builder));
-  ASSERT_EQ("mt.exe @\"x64/Debug/app/mt.rsp\" /nologo\nReturn code : 5\n", trace);
+  AddTool("link.exe", "touch lib/x64/Debug/app.exe\n");
+  ASSERT_FALSE(Link({"a.obj"}));
+  ASSERT_EQ("Linking...\nmt.exe @\"x64/Debug/app/mt.rsp\" /nologo\nReturn code : 5\n", trace);
+  ASSERT_FALSE(FileExists("lib/x64/Debug/app.exe"));
   std::filesystem::remove_all("x64");
   trace.clear();
-  ASSERT_FALSE(LinkTarget(*builder, TargetPath(*builder), {"a.obj"}));
+  ASSERT_FALSE(Link({"a.obj"}));
   ASSERT_EQ("Error writing  \"a.obj\" - linking failed\n", trace);
   ASSERT_EQ(3, builder->errorCount);
 }
@@ -443,7 +400,7 @@ TEST_F(ToolsTest, GccLinks) {
       " \"lib/x64/Debug/libbase.a\" \"v/b.a\" \"-lz\" -Xlinker -rpath -Xlinker '$ORIGIN' -lm \"-Wl,-z now\" "
       "\"v/x64.a\" -LDebug -Wl,-z,$x\n";
   Builder(CompilerKind::gcc);
-  ASSERT_TRUE(LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder)));
+  ASSERT_TRUE(Link(CollectLinkInputs(*builder)));
   ASSERT_EQ("g++ @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/app\"" + inputs, TakeLog());
   ASSERT_EQ((std::vector<std::string>{"v/b.a", "-lz", "v/x64.a"}), LibrariesOfSwitches(*builder));
 
@@ -451,7 +408,7 @@ TEST_F(ToolsTest, GccLinks) {
   for (const auto& [compiler, linker] :
        {std::pair(CompilerKind::clang, "clang++"), {CompilerKind::winegcc, "wineg++"}}) {
     Builder(compiler);
-    LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder));
+    Link(CollectLinkInputs(*builder));
     ASSERT_EQ(linker + (" @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/libapp.so\" -shared"
                         " \"-Wl,-soname,libapp.so\"" +
                         inputs),
@@ -461,7 +418,7 @@ TEST_F(ToolsTest, GccLinks) {
   app.targetType = TargetType::StaticLibrary;
   Builder(CompilerKind::gcc);
   Write("lib/x64/Debug/libapp.a", "old members");
-  LinkTarget(*builder, TargetPath(*builder), CollectLinkInputs(*builder));
+  Link(CollectLinkInputs(*builder));
   ASSERT_EQ("ar rcs lib/x64/Debug/libapp.a @x64/Debug/app/linker.rsp\n \"x64/Debug/app/a.o\"\n", TakeLog());
   ASSERT_FALSE(FileExists("lib/x64/Debug/libapp.a"));
 }

@@ -44,7 +44,8 @@ TEST_F(ConfigTest, Keys) {
       "workspaces = { \"old\" } workspaces = { } workspaces += { \"w\" }\n"
       "config = \"Old\" config=\"New\" platform = ('P') systemName = \"N\" systemProcessor = \"R\"\n"
       "systemVersion = \"V\" sizeofPointer = \"8\"\n"
-      "compiler = winegcc mode = show\n"
+      "platformToolset = \"v143\" windowsSdk = (\"10\" + '.0')\n"
+      "compiler = winegcc mode = show runtime = built\n"
       "targetXP = true defaultToDll = false diagnostics = true translateOnly = true rebuildAll = true modernCpp = "
       "true\n"
       "exportPublicHeaders = false repackageExecutableTargets = false solutionContainsPrepackagedProjects = false\n"
@@ -55,7 +56,9 @@ TEST_F(ConfigTest, Keys) {
   EXPECT_EQ("[w]", Joined(Got().workspaces));
   EXPECT_EQ("New P N R V 8", Got().config + " " + Got().platform + " " + Got().systemName + " " +
                                  Got().systemProcessor + " " + Got().systemVersion + " " + Got().sizeofPointer);
+  EXPECT_EQ("v143 10.0", Got().platformToolset + " " + Got().windowsSdk);
   EXPECT_EQ(CompilerKind::winegcc, Got().compiler);
+  EXPECT_EQ(RuntimeChoice::Built, Got().runtime);
   EXPECT_EQ(RunMode::Clean, Got().mode);  // a line of the command line comes last
   EXPECT_TRUE(Got().targetXP && Got().diagnostics && Got().translateOnly && Got().rebuildAll && Got().modernCpp);
   EXPECT_FALSE(Got().defaultToDll || Got().exportPublicHeaders || Got().repackageExecutableTargets);
@@ -112,6 +115,7 @@ TEST_F(ConfigTest, Messages) {
            {"\nmode clean", "(2) : Expected = after mode when read clean"},
            {"mode = Clean", "(1) : Invalid option : Clean"},
            {"compiler =", "(1) : Invalid option : EOS"},
+           {"runtime = \"built\"", "(1) : Invalid option : \"built\""},
            {"\n\nmoed = clean", "(3) : Syntax error: moed"},
            {"translateOnly = yes", "(1) : Expected false/true after = when read yes"},
            {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},

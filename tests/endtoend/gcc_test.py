@@ -244,11 +244,12 @@ def missing_tools_are_named_and_counted(workspace):
 
 
 @in_workspace(FILES, "g++")
-def captured_output_that_cannot_be_read_is_an_error(workspace):
-    workspace.path("out1.txt").mkdir()
-    holds(workspace.run("all.qrex"), "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
+def captured_output_that_cannot_be_kept_is_an_error(workspace):
+    workspace.write("tools/gcc-4", "#!/bin/sh\nhead -c 3000000 /dev/zero | tr '\\0' x\n")
+    output = workspace.shell("ulimit -f 2000; Qrex all.qrex")  # blocks: none of the files of a run is as large
+    holds(output, "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
           "ERROR getting stdout\n", "x64/Debug/base/compiler.rsp: ", "\nCompleted with 0 warnings, 6 errors.")
-    workspace.path("out1.txt").rmdir()
+    workspace.path("tools/gcc-4").unlink()
     workspace.run("all.qrex")
     equal(workspace.shell(PROGRAM), RESULT)
 
@@ -322,7 +323,7 @@ run_tests([
     what_switches_name_reaches_the_program,
     failing_tools_are_counted_and_the_next_run_recovers,
     missing_tools_are_named_and_counted,
-    captured_output_that_cannot_be_read_is_an_error,
+    captured_output_that_cannot_be_kept_is_an_error,
     an_interrupted_tool_ends_the_run,
     the_other_compilers_of_the_family,
     make_builds_the_same_targets,

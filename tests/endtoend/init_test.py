@@ -99,10 +99,9 @@ def templates_are_found_where_an_installation_puts_them(workspace):
         for part in ("templates", "runtime"):
             shutil.copytree(ROOT / part, workspace.path(data) / part)
         os.symlink(workspace.path(folder) / "Qrex", workspace.path("link"))
-        subprocess.run([workspace.path("link"), "--init", "w", f"of/{folder}"], cwd=workspace.folder, check=True,
-                       stdout=subprocess.DEVNULL)
+        for of, arguments in ((".", ["--init", "w", f"of/{folder}"]), (f"of/{folder}", ["w.qrex", "translateOnly=true"])):
+            subprocess.run([workspace.path("link"), *arguments], cwd=workspace.path(of), check=True, stdout=subprocess.DEVNULL)
         workspace.path("link").unlink()
-        holds(workspace.path(f"of/{folder}/settings.inc").read_text(), f'"{workspace.path(data).resolve()}/runtime"')
     # Where the system does not tell the program's path: by the word that it is called by.
     hide = "unshare -rm sh -c 'mount -t tmpfs none /proc && %s'"
     if subprocess.run(hide % "true", shell=True, capture_output=True).returncode == 0:
@@ -110,9 +109,12 @@ def templates_are_found_where_an_installation_puts_them(workspace):
             folder = "installed/share/qrex" if call.startswith("..") else "."
             workspace.shell(f"cd {folder} && " + hide % f"{call} --init w {workspace.folder}/hidden{number}")
     shutil.copy(workspace.binary, workspace.path("alone"))
-    done = subprocess.run([workspace.path("alone"), "--init", "w"], cwd=workspace.folder, capture_output=True, text=True)
-    equal(done.returncode, 1)
-    holds(done.stdout, "Error: No templates/workspace and runtime in any of\n")
+    for status, environment in ((1, {}), (0, {"QREX_DATA_FOLDER": str(workspace.path("beside"))})):
+        for of, arguments in ((".", ["--init", "w"]), ("of/beside", ["w.qrex", "translateOnly=true"])):
+            done = subprocess.run([workspace.path("alone"), *arguments], cwd=workspace.path(of), env=environment,
+                                  capture_output=True, text=True)
+            equal(done.returncode, status)
+            holds(done.stdout, *([f"No {'templates/workspace and ' * (of == '.')}runtime in any of\n"] * status))
 
 
 @in_workspace({"--help": ""})

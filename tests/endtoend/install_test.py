@@ -3,7 +3,9 @@
 
 import os
 import pty
+import re
 import select
+import shutil
 import signal
 import subprocess
 import sys
@@ -12,11 +14,12 @@ import time
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, holds, need, run_tests  # noqa: E402
+from workspace_fixture import equal, holds, lacks, need, run_tests  # noqa: E402
 
 INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex"]
-RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h"]
+RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h", "lib/qrex/include/Vesk/vxObject/IObject.h",
+           "lib/qrex/runtime/x64/Debug/libvxObject.a", "lib/qrex/runtime/x64/Release/libvxObject.a"]
 
 
 def installed(test):
@@ -39,16 +42,83 @@ def components(prefix, work):
     equal([name for name in INSTALLED + RUNTIME if not (prefix / name).is_file()], [])
 
 
+PAGE = Path(__file__).resolve().parents[2] / "docs/install.md"
+
+
+def qrex(prefix, folder, *arguments, status=0):
+    done = subprocess.run(["Qrex", *arguments], cwd=folder, env={"PATH": f"{prefix}/bin:/usr/bin:/bin"}, stdin=subprocess.DEVNULL,
+                          capture_output=True, text=True)
+    equal((done.returncode, done.stderr), (status, ""))
+    return done.stdout
+
+
 @installed
 def first_workspace(prefix, work):
+    """The steps of the page. The runtime comes built, for clang++ and make as well."""
+    steps = re.search(r"\n\n((?:    .*\n)*    Qrex --init zoo\n(?:    .*\n)*)", PAGE.read_text()).group(1)
     environment = {"PATH": f"{prefix}/bin:/usr/bin:/bin"}
-    for command in (["Qrex", "--init", "zoo"], ["Qrex", "zoo.qrex"]):
-        folder = work / "zoo" if command[1] == "zoo.qrex" else work
-        done = subprocess.run(command, cwd=folder, env=environment, stdin=subprocess.DEVNULL, capture_output=True, text=True)
-        equal((done.returncode, done.stderr), (0, ""))
-    programs = [path for path in (work / "zoo/out/lib").rglob("zoo_app") if path.is_file()]
-    equal(len(programs), 1)
-    equal(subprocess.run(programs, stdout=subprocess.DEVNULL).returncode, 0)
+    output = subprocess.run(["bash", "-ec", steps], cwd=work, env=environment, check=True, capture_output=True, text=True).stdout
+    holds(output, "[prepackaged - only processing headers]", "Completed....", "Leo had 4.5 kg, as release 1 tells\n")
+    workspace, program = work / "zoo", work / "zoo/out/lib/x64/Debug/zoo_app"
+    if shutil.which("clang++"):
+        program.unlink()
+        holds(qrex(prefix, workspace, "zoo.qrex", "compiler=clang", "rebuildAll=true"), "Completed....")
+        subprocess.run(program, check=True, stdout=subprocess.DEVNULL)
+    if shutil.which("make"):
+        qrex(prefix, workspace, "zoo.qrex", "mode=gen")
+        program.unlink()
+        subprocess.run(["make", "d"], cwd=workspace, env=environment, check=True, stdout=subprocess.DEVNULL)
+        subprocess.run(program, check=True, stdout=subprocess.DEVNULL)
+    equal([str(path) for path in (workspace / "x64/Debug/vxObject").glob("*.o")], [])
+    # An upgrade whose files are older than what was translated.
+    (prefix / "lib/qrex/runtime/Vesk/vxObject/library.inc").write_text("#define VESK_LIBRARY_HEADERS 1\n")
+    with open(workspace / "tree/zoo_core/src/zoo_core.cpp", "a") as source:
+        source.write("int more;\n")
+    holds(qrex(prefix, workspace, "zoo.qrex"), "These headers were translated for another build of the runtime", " 1 errors")
+
+
+@installed
+def moved(prefix, work):
+    """A workspace is translated by a tool elsewhere, and the runtime is that of this tool, built or not."""
+    qrex(prefix, work, "--init", "zoo")
+    lacks((work / "zoo/settings.inc").read_text(), str(work.parent))
+    tool, checkout = work / "tools", work / "checked out/here"
+    shutil.move(prefix, tool)
+    shutil.copytree(work / "zoo", checkout)
+    shutil.rmtree(work / "zoo")
+    for argument, graph in (("runtime=built", False), ("runtime=source", True), ('config="Profile"', True)):
+        status = 1 if "Profile" in argument else 0  # a configuration that neither has
+        output = qrex(tool, checkout, "zoo.qrex", "translateOnly=true", argument, status=status)
+        equal("[prepackaged" in output, not graph)
+        equal(any(checkout.glob("qrexsource/x64/*/Vesk/vxObject/src/graph.cpp")), graph)
+    (tool / "lib/qrex/runtime/release").write_text("1.0")
+    holds(qrex(tool, checkout, "zoo.qrex", status=1), "ERROR:  The runtime in ", " is of release 1.0, this tool of ")
+    shutil.rmtree(tool / "lib/qrex")
+    lacks(qrex(tool, checkout, "zoo.qrex", "translateOnly=true"), "[prepackaged")
+
+
+# What the built runtime says when it is compiled by these; nothing: that it fits.
+MODES = [("g++ -std=c++17", ""), ("g++ -std=c++20 -O2", ""), ("clang++ -std=c++17", ""),
+         ("g++ -std=c++17 -D_GLIBCXX_DEBUG", "The built runtime is not for _GLIBCXX_DEBUG: set runtime = source"),
+         ("g++ -std=c++17 -D_GLIBCXX_USE_CXX11_ABI=0", "The built runtime is for _GLIBCXX_USE_CXX11_ABI=1: set runtime = source"),
+         ("clang++ -std=c++17 -stdlib=libc++", "The built runtime is for libstdc++: set runtime = source")]
+
+
+@installed
+def what_does_not_fit_does_not_compile(prefix, work):
+    def said(command):
+        done = subprocess.run([*command.split(), "-fsyntax-only", "-x", "c++", "-I", prefix / "lib/qrex/include", "-"],
+                              input="#include <Vesk/vxObject/Platform.h>\n", capture_output=True, text=True)
+        error = re.search(r'#error "(.*?)"', done.stderr)
+        return error.group(1) if error else done.stderr
+
+    there = [(command, text) for command, text in MODES
+             if subprocess.run([*command.split(), "-fsyntax-only", "-x", "c++", "-include", "set", "/dev/null"],
+                               capture_output=True).returncode == 0]
+    equal([(command, said(command)) for command, _ in there], there)
+    header = prefix / "lib/qrex/include/Vesk/vxObject/Platform.h"
+    header.write_text(re.sub("(#define VESK_VERSION) .*", r"\1 90000", header.read_text()))
+    holds(said("g++ -std=c++17"), "The built runtime is of version ")
 
 
 @installed
@@ -132,4 +202,4 @@ def zsh_completion(prefix, work):
     completions(["zsh", "-f", "-i"], f"fpath=({folder} $fpath); autoload -U compinit; compinit -u -D", work)
 
 
-run_tests([components, first_workspace, manual_page, debian_package, bash_completion, zsh_completion])
+run_tests([components, first_workspace, moved, what_does_not_fit_does_not_compile, manual_page, debian_package, bash_completion, zsh_completion])

@@ -274,6 +274,18 @@ ssize_t send(int socket, const void* data, size_t size, int flags) {
   return real(socket, data, size, flags);
 }
 
+ssize_t sendmsg(int socket, const struct msghdr* message, int flags) {
+  REAL(ssize_t, "sendmsg", int, const struct msghdr*, int);
+  FAILS(SEND, -1)
+  return real(socket, message, flags);
+}
+
+ssize_t recvmsg(int socket, struct msghdr* message, int flags) {
+  REAL(ssize_t, "recvmsg", int, struct msghdr*, int);
+  FAILS(RECV, -1)
+  return real(socket, message, flags);
+}
+
 ssize_t recv(int socket, void* data, size_t size, int flags) {
   REAL(ssize_t, "recv", int, void*, size_t, int);
   FAILS(RECV, -1)

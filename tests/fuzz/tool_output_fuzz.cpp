@@ -14,9 +14,9 @@ extern "C" int LLVMFuzzerTestOneInput(const uint8_t* data, size_t size) {
   fuzz::Run([&] {
     if (isChecked && !world.builder->FindFile("app/t.h")) __builtin_trap();
     ScannedFile& header = world.Scanned("app/t.h");
-    header.translated = true;
-    header.sourceText = "a\nb\n";
-    header.lineTable = {nullptr, header.sourceText.data()};
+    header.state = TranslationState::Done;
+    header.text.source = "a\nb\n";
+    header.text.lines = {nullptr, header.text.source.data()};
     ScanToolOutput(*world.builder, output);
   });
   return 0;

@@ -133,6 +133,28 @@ TEST_F(ProjectDetailsTest, OptionsOfTheNewFormat) {
               "</PrecompiledHeaderFile>\n");
 }
 
+TEST_F(ProjectDetailsTest, Toolsets) {
+  WriteProject("app", "Application", "general (\"Release\") { PlatformToolset = \"ClangCL\" } { }");
+  settings.platformToolset = "v143";
+  settings.targetXP = true;
+  for (const auto& [compiler, sdk, told] :
+       {std::tuple(CompilerKind::vc10, "", "10.0"), std::tuple(CompilerKind::vc14, "10.0.22621.0", "10.0.22621.0")}) {
+    settings.windowsSdk = sdk;
+    LoadAndGenerate(compiler);
+    AssertHolds("app.vcxproj", "}</ProjectGuid>\n    <WindowsTargetPlatformVersion>" + std::string(told) +
+                                   "</WindowsTargetPlatformVersion>\n  </PropertyGroup>\n");
+    for (const auto& [config, toolset] : {std::pair("Debug", "v143"), std::pair("Release", "ClangCL")}) {
+      AssertHolds("app.vcxproj",
+                  "'=='" + std::string(config) +
+                      "|x64'\" Label=\"Configuration\">\n    <ConfigurationType>Application</ConfigurationType>\n"
+                      "    <PlatformToolset>" +
+                      toolset + "</PlatformToolset>\n  </PropertyGroup>\n");
+    }
+  }
+  LoadAndGenerate(CompilerKind::vc8);  // has no such attribute
+  AssertLacks("app.vcproj", "Toolset");
+}
+
 // A utility project has no tool of any sort.
 TEST_F(ProjectDetailsTest, UtilityProjects) {
   WriteProject("app", "Utility Project", "+link { /NOLOGO } { }");

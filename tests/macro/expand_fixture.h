@@ -21,7 +21,7 @@ class ExpandTest : public ::testing::Test, public ImportHandler {
       return ExpandFile("t", text);
     } catch (const LexScannerException& exception) {
       MemoryTextWriter writer;
-      ReportParseError(sources, writer, exception);
+      WriteMessage(writer, ParseErrorOf(sources, exception));
       const std::string report = writer.TakeText();
       return report.substr(1, report.size() - 2);
     }

@@ -167,7 +167,7 @@ TEST(SourceMapTest, Positions) {
   }
   const auto report = [&](const char* position) {
     MemoryTextWriter writer;
-    ReportParseError(files, writer, LexScannerException("no", position));
+    WriteMessage(writer, ParseErrorOf(files, LexScannerException("no", position)));
     return writer.TakeText();
   };
   EXPECT_EQ("\nf1(1) : no\n", report(files[0]->text.data()));

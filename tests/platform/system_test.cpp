@@ -1,4 +1,4 @@
-// What the layer makes of the system below: commands, error codes, file times, a stack of any size.
+// What the layer makes of the system below: error codes, file times, a stack of any size.
 
 #include "platform/system.h"
 
@@ -7,54 +7,11 @@
 #include "platform/console.h"
 #include "platform/error.h"
 #include "platform/file_system.h"
-#include "platform/tool_keeper.h"
 #include "world_fixture.h"
 
 namespace qrex::platform {
 
-class SystemTest : public WorldTest {
- protected:
-  ToolKeeper keeper;
-};
-
-TEST_F(SystemTest, Commands) {
-  EXPECT_EQ(3, RunCommand(keeper, "cmd /c exit 3"));
-  EXPECT_EQ(0, RunCommand(keeper, "true"));
-  EXPECT_EQ(127, RunCommand(keeper, "cmd /c command-that-is-nowhere 2>/dev/null"));
-  SetEnvironment("QREX_TEST", "a b");
-  EXPECT_EQ(0, RunCommand(keeper, "printenv QREX_TEST 1>/dev/null"));
-  // In quotes and outside of them what the shell would act on is text.
-  for (const std::string text : {"$QREX_TEST", "`exit`", "a;exit", "a&b|c", "it's", "*", "a\\b"}) {
-    EXPECT_EQ(0, RunCommand(keeper, "touch \"" + text + "\"")) << text;
-    EXPECT_TRUE(std::filesystem::remove(text)) << text;
-    EXPECT_EQ(0, RunCommand(keeper, "touch " + text)) << text;
-    EXPECT_TRUE(std::filesystem::remove(text)) << text;
-  }
-}
-
-TEST_F(SystemTest, CompilerOfTheGccFamily) {
-  Write("bin/gcc", "#!/bin/sh\nexit 7\n");
-  std::filesystem::permissions("bin/gcc", std::filesystem::perms::owner_all);
-  const std::string path = std::getenv("PATH");
-  SetEnvironment("PATH", "bin:/bin:/usr/bin");
-  EXPECT_EQ(7, RunCommand(keeper, "cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
-  std::filesystem::rename("bin/gcc", "bin/gcc-4");
-  EXPECT_EQ(7, RunCommand(keeper, "gcc-4 x"));
-  EXPECT_EQ(FindProgram("bin/gcc-4"), FindProgram("gcc-4"));
-  EXPECT_EQ(std::filesystem::current_path() / "bin/gcc-4", FindProgram("gcc-4"));
-  EXPECT_EQ("", FindProgram("gcc-5") + FindProgram("none/gcc-4"));
-  SetEnvironment("PATH", path);
-}
-
-TEST_F(SystemTest, BatchFile) {
-  Write("a/mark.bat", "@echo Updated %TIME% %DATE% >\"mark.dep\"\n");
-  EXPECT_EQ(0, RunCommand(keeper, "cmd /c \"a\\mark.bat\""));
-  const std::string content = Read("mark.dep");
-  EXPECT_EQ(0u, content.find("Updated "));
-  EXPECT_EQ(std::string::npos, content.find('%'));
-  RemoveFile("a/mark.bat");
-  EXPECT_NE(0, RunCommand(keeper, "cmd /c \"a\\mark.bat\""));
-}
+using SystemTest = WorldTest;
 
 TEST_F(SystemTest, DeepStack) {
   struct Deep {

@@ -46,7 +46,7 @@ class TranslateTest : public WorldTest {
   std::string Translate(const std::string& name) {
     App().CollectFiles();
     ScannedFile& file = Scanned(name);
-    file.translated = false;
+    file.TakeBack();
     file.needsWriting = true;
     BringUpToDate(file);
     return ReadText(builder->TranslatedPath(file));

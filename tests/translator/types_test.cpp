@@ -31,7 +31,7 @@ class TypesTest : public TranslateTest {
       void Flush() override {}
     } target;
     ScannedFile& file = Scanned("t.cpp");
-    QrexParserOutputStream stream(target, file.lineTable, range, map);
+    QrexParserOutputStream stream(target, file.text.lines, range, map);
     TextWriter out(stream);
     QrexParser parser(file, stream, out, range, AllKeywords());
     try {

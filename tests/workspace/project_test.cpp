@@ -309,6 +309,7 @@ TEST_F(ProjectTest, Messages) {
            {"prelinkevent { \"a\" }", "(3) : Expected quoted string when read }"},
            {"prelinkevent { \"a\" \"b\" \"c\" }", "(3) : Expected } after \"b\" when read \"c\""},
            {"general { Key = \"a\" }", "(3) : Invalid key Key"},
+           {"general { PlatformToolset = \"v143\" }", "(3) : Invalid key PlatformToolset"},
            {"general { \"Key\" }", "(3) : Expected identifier when read \"Key\""},
            {"general (\"a\" \"b\") { }", "(3) : Expected comma or right parenthesis when read \"b\""},
            {"general () { }", "(3) : Expected quoted string when read )"},

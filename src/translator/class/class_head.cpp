@@ -19,14 +19,17 @@ void ParseIsaList(QrexParser& parser, ClassDef& def) {
     }
     auto& interface = static_cast<InterfaceDef&>(element);
     if (interface.status != DeclStatus::Defined) {
-      parser.ReportWarning(1016, PrintedElement(interface) + " not defined", nullptr, entry.text.begin);
+      parser.ReportWarning(Warning::IsaUndefined, PrintedElement(interface) + " not defined", nullptr,
+                           entry.text.begin);
     }
-    if (parser.WarningOn(1003) && interface.status == DeclStatus::Defined && !interface.SubtypesIObject()) {
-      parser.ReportWarning(1003, "isa on " + PrintedElement(interface) + " doesn't inherit from IObject");
+    if (parser.WarningOn(Warning::IsaNoIObject) && interface.status == DeclStatus::Defined &&
+        !interface.SubtypesIObject()) {
+      parser.ReportWarning(Warning::IsaNoIObject,
+                           "isa on " + PrintedElement(interface) + " doesn't inherit from IObject");
       parser.SeeDeclaration(interface);
     }
-    if (parser.WarningOn(1013) && !interface.m_reflected) {
-      parser.ReportWarning(1013, "isa on " + PrintedElement(interface) + " not reflected");
+    if (parser.WarningOn(Warning::IsaUnreflected) && !interface.m_reflected) {
+      parser.ReportWarning(Warning::IsaUnreflected, "isa on " + PrintedElement(interface) + " not reflected");
       parser.SeeDeclaration(interface);
     }
     def.m_interfaces.push_back(&interface);

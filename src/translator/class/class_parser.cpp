@@ -129,7 +129,8 @@ void ClassStatement::ParseForward() {
   if (m_implement) {
     m_parser.Fail("Forward declaration of " + PrintedElement(*m_def) + " incompatible with 'implements'");
   }
-  if (m_exported) m_parser.ReportWarning(1017, "+ on forward declaration of " + m_name + " deprecated");
+  if (m_exported)
+    m_parser.ReportWarning(Warning::DeprecatedExport, "+ on forward declaration of " + m_name + " deprecated");
   WriteForwardDeclaration(m_out, *m_def);
   m_def->status = DeclStatus::Forward;
   m_parser.EnterForward(std::move(m_made), m_old, m_enclosing);

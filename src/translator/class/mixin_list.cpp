@@ -152,9 +152,10 @@ const std::vector<FunctionSignature>& ReadMethodOwner(QrexParser& parser, ClassD
     throw LexScannerException("$interface identifier expected when read " + PrintedElement(element), entry);
   }
   auto& interface = static_cast<InterfaceDef&>(element);
-  if (parser.WarningOn(1014) && std::find(implemented.begin(), implemented.end(), &interface) == implemented.end()) {
-    parser.ReportWarning(
-        1014, PrintedElement(def) + " implementing " + PrintedElement(interface) + " without associated 'isa'");
+  if (parser.WarningOn(Warning::ImplementedWithoutIsa) &&
+      std::find(implemented.begin(), implemented.end(), &interface) == implemented.end()) {
+    parser.ReportWarning(Warning::ImplementedWithoutIsa, PrintedElement(def) + " implementing " +
+                                                             PrintedElement(interface) + " without associated 'isa'");
     parser.SeeDeclaration(interface);
   }
   owner = &element;
@@ -184,7 +185,7 @@ void ParseAdtBody(QrexParser& parser, ClassDef& adt) {
 
 void ParseImplementing(QrexParser& parser, ClassDef& def) {
   std::vector<const InterfaceDef*> implemented;
-  if (parser.WarningOn(1014)) implemented = AllInterfaces(def);
+  if (parser.WarningOn(Warning::ImplementedWithoutIsa)) implemented = AllInterfaces(def);
   parser.Advance();
   for (;; parser.Advance()) {
     const NameSpaceElement* owner = nullptr;

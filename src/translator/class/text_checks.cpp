@@ -26,7 +26,7 @@ void CheckModels(QrexParser& parser, const ClassDef& def) {
   CollectModels(def, models, walked);
   if (models.empty()) return;
   if (def.m_inheritsModel) {
-    parser.ReportWarning(Warnings::kTwoModels,
+    parser.ReportWarning(Warning::TwoModels,
                          PrintedElement(def) + " archives and prints the model of " + PrintedElement(*models.back()) +
                              " in place of its own: write one model that has the fields of both",
                          &def);

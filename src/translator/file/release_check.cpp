@@ -52,7 +52,7 @@ void CheckTargetRelease(QrexParser& parser) {
   }
   if (!latest || LastRelease(*latest) <= release) return;
   const std::string last = std::to_string(LastRelease(*latest));
-  parser.ReportWarning(Warnings::kEarlierRelease,
+  parser.ReportWarning(Warning::EarlierRelease,
                        "The target of the project writes archives of release " + number.text.Text() + ", but " +
                            PrintedElement(*latest) + " has release " + last +
                            ": nothing could read them, define the target with " + last,

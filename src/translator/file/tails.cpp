@@ -1,6 +1,5 @@
 #include "translator/file/tails.h"
 
-#include "text/trace.h"
 #include "translator/emit/emit.h"
 #include "translator/kinds/type_registration.h"
 #include "workspace/workspace.h"
@@ -10,11 +9,12 @@ namespace qrex {
 namespace {
 
 void WriteTail(ScannedFile& file, TextWriter& out, RegistrationLists& lists) {
-  file.registered = true;
+  file.tail.isRegistered = true;
   file.rootNameSpace->WriteReflection(out, lists);
-  for (const TypeRegistration& registration : file.typeRegistrations) WriteTypeRegistration(out, registration, lists);
-  lists.registerNames.insert(lists.registerNames.end(), file.registerNames.begin(), file.registerNames.end());
-  lists.unregisterNames.insert(lists.unregisterNames.end(), file.unregisterNames.begin(), file.unregisterNames.end());
+  const Registrations& own = file.registrations;
+  for (const TypeRegistration& registration : own.types) WriteTypeRegistration(out, registration, lists);
+  lists.registerNames.insert(lists.registerNames.end(), own.registerNames.begin(), own.registerNames.end());
+  lists.unregisterNames.insert(lists.unregisterNames.end(), own.unregisterNames.begin(), own.unregisterNames.end());
 }
 
 // "a::b::N" taken apart.
@@ -63,13 +63,14 @@ void WriteReflectionTails(ScannedFile& file, TextWriter& out) {
   const ProjectFile& source = file.file;
   bool wroteHeader = false;
   for (ScannedFile* import : file.imports) {
-    if (import->registered || !MayHoldTail(source, import->file)) continue;
+    if (import->tail.isRegistered || !MayHoldTail(source, import->file)) continue;
     WriteTail(*import, out, lists);
-    file.newTails.push_back(import);
+    file.tail.written.push_back(import);
     wroteHeader = wroteHeader || &import->file == source.pairedHeader;
   }
   if (source.pairedHeader && !wroteHeader) {
-    TraceWriter() << file.SourcePath() << "(1) : warning : cpp file doesn't directly import header with same name\n";
+    file.host.Tell(Message(Severity::Warning, "warning : ", "cpp file doesn't directly import header with same name")
+                       .At({file.SourcePath(), 1}));
   }
   WriteTail(file, out, lists);
   file.host.RegisterMap().Update(source.path, lists.registerNames);

@@ -1,4 +1,4 @@
-// Translating one file: macro pass, main loop, tails; and writing what came of it.
+// Translating one file with all that it imports, and writing what came of it.
 #pragma once
 
 #include "text/streams.h"
@@ -10,7 +10,8 @@ namespace qrex {
 // clears it). A file of a kind that is not translated is copied then.
 void BringUpToDate(ScannedFile& file);
 
-// Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`.
-void TranslateFile(ScannedFile& file, IOutputStream& target);
+// The same of a translation that has not begun, but for the output: the generated text goes to `target`, with line
+// feeds. Where no file asks for writing, this reads texts and does nothing else: no clock is asked, nothing is written.
+void TranslateInto(ScannedFile& file, IOutputStream& target);
 
 }  // namespace qrex

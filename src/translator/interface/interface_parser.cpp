@@ -225,17 +225,19 @@ void InterfaceStatement::CheckBases() {
   if (m_def->m_numTables > kMaxTables) m_parser.Fail("Too many base interfaces of " + PrintedElement(*m_def));
   const auto subtypes =
       std::count_if(bases.begin(), bases.end(), [](const auto* base) { return base->SubtypesIObject(); });
-  if (m_parser.WarningOn(1006) && subtypes > 0 && static_cast<size_t>(subtypes) < bases.size()) {
+  if (m_parser.WarningOn(Warning::InconsistentIObject) && subtypes > 0 &&
+      static_cast<size_t>(subtypes) < bases.size()) {
     std::string text = "Inconsistent subtyping of IObject in base interfaces";
     for (const InterfaceDef* base : bases) {
       text += "\n    " + PrintedElement(*base) +
               (base->SubtypesIObject() ? " subtypes IObject" : " doesn't subtype IObject");
     }
-    m_parser.ReportWarning(1006, text);
+    m_parser.ReportWarning(Warning::InconsistentIObject, text);
     for (const InterfaceDef* base : bases) m_parser.SeeDeclaration(*base);
   }
   if (!m_def->m_reflected && m_def->SubtypesIObject()) {
-    m_parser.ReportWarning(1007, PrintedElement(*m_def) + " subtypes IObject but isn't reflected", m_def);
+    m_parser.ReportWarning(Warning::IObjectUnreflected,
+                           PrintedElement(*m_def) + " subtypes IObject but isn't reflected", m_def);
   }
 }
 

@@ -262,7 +262,7 @@ void RemoteText::WriteFactory(std::string_view kind) {
         "kind"_ = kind, "name"_ = m_name);
   std::string scope = m_interface.parent->GetQualifiedName();
   if (!scope.empty()) scope += "::";
-  m_interface.owner.registerNames.push_back(scope + std::string(kind) + m_name);
+  m_interface.owner.registrations.registerNames.push_back(scope + std::string(kind) + m_name);
 }
 
 }  // namespace

@@ -58,7 +58,8 @@ void EnumStatement::ReadHeading() {
 }
 
 void EnumStatement::ParseForward() {
-  if (m_exported) m_parser.ReportWarning(1017, "+ on forward declaration of " + m_def->name + " deprecated");
+  if (m_exported)
+    m_parser.ReportWarning(Warning::DeprecatedExport, "+ on forward declaration of " + m_def->name + " deprecated");
   if (m_def->m_isClass) {
     m_parser.out << "class " << m_def->name << ";\n";
   } else {

@@ -57,10 +57,12 @@ void CheckFunctionDefinition(QrexParser& parser, const GlobalFunctionDef& def, c
   if (old && old->status == DeclStatus::Defined) parser.FailRepeated(*old, def);
   const bool isInline = def.m_signature.isInline;
   if (parser.file.file.kind == FileKind::H && !isInline) {
-    parser.ReportWarning(1011, PrintedElement(def) + " is defined in a header file and isn't inlined", &def);
+    parser.ReportWarning(Warning::NotInlineInHeader,
+                         PrintedElement(def) + " is defined in a header file and isn't inlined", &def);
   }
   if (IsLibrary(parser.GetProject().targetType) && !isInline && !old) {
-    parser.ReportWarning(1012, PrintedElement(def) + " defined in library without prior declaration", &def);
+    parser.ReportWarning(Warning::UndeclaredInLibrary,
+                         PrintedElement(def) + " defined in library without prior declaration", &def);
   }
 }
 
@@ -86,8 +88,8 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
   parser.Current().Add(std::move(made));
   if (!def.m_signature.isInline) parser.out << ExportPrefix(def);
   WriteSignature(parser.out, def.m_signature);
-  if (old && parser.WarningOn(1010) && !SameSignature(def, *old)) {
-    parser.ReportWarning(1010,
+  if (old && parser.WarningOn(Warning::InconsistentSignatures) && !SameSignature(def, *old)) {
+    parser.ReportWarning(Warning::InconsistentSignatures,
                          PrintedElement(def) + " declarations have inconsistent signatures :\n    " +
                              SignatureText(def.m_signature) + "\n    " + SignatureText(old->m_signature) + "\n",
                          &def);
@@ -96,7 +98,8 @@ void ParseGlobalFunction(QrexParser& parser, bool polymorphic) {
   if (parser.Is(kSemicolon)) {
     parser.CheckNotInPublicHeader(def);
     if (def.ContainsMetaData()) {
-      parser.ReportWarning(1000, "Forward declaration of " + PrintedElement(def) + " contains metadata", &def);
+      parser.ReportWarning(Warning::MetadataOfForward,
+                           "Forward declaration of " + PrintedElement(def) + " contains metadata", &def);
     }
     parser.DropBehindCurrent();
     if (polymorphic) {

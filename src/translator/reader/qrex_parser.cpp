@@ -134,7 +134,7 @@ void QrexParser::Translate() {
     }
   }
   CopyTo(expanded.end);
-  if (warnings.HasSaved()) ReportWarning(1015, "$warning(push) without matching pop");
+  if (warnings.HasSaved()) ReportWarning(Warning::PushWithoutPop, "$warning(push) without matching pop");
 }
 
 void QrexParser::CheckInclude() {
@@ -274,7 +274,9 @@ void ParseInitBlock(QrexParser& parser, std::string_view keyword, std::vector<st
 
 }  // namespace
 
-void ParseInit(QrexParser& parser) { ParseInitBlock(parser, "Register", parser.file.registerNames); }
-void ParseUninit(QrexParser& parser) { ParseInitBlock(parser, "Unregister", parser.file.unregisterNames); }
+void ParseInit(QrexParser& parser) { ParseInitBlock(parser, "Register", parser.file.registrations.registerNames); }
+void ParseUninit(QrexParser& parser) {
+  ParseInitBlock(parser, "Unregister", parser.file.registrations.unregisterNames);
+}
 
 }  // namespace qrex

@@ -136,19 +136,19 @@ class QrexParser : public ExpressionParser {
   void ParseMetadataBehindColon(std::string& out);
 
   // --- Warnings
-  bool WarningOn(int code) const { return warnings.On(code); }
+  bool WarningOn(Warning warning) const { return warnings.On(warning); }
   // Position: `address` in the expanded text, else the element's, else where the scanner reads.
-  void ReportWarning(int code, std::string_view text, const NameSpaceElement* element = nullptr,
+  void ReportWarning(Warning warning, std::string_view text, const NameSpaceElement* element = nullptr,
                      const char* address = nullptr);
   // That the text of a declaration can't compile; says what to write instead. Only where text that compiles is wanted.
   void WarnOfText(std::string_view text, const NameSpaceElement& element, const char* address = nullptr);
   bool WantsCompilableText() const { return file.host.Settings().compilableText; }
   void CheckPublicHeader(const NameSpaceElement& element);       // both of the following
-  void CheckNotExported(const NameSpaceElement& element);        // W1009
-  void CheckNotInPublicHeader(const NameSpaceElement& element);  // W1008
-  void CheckReferences(const NameSpaceElement& element);         // W1002
-  void CheckMetadata(const NameSpaceElement& element);           // W1001: non-reflected with metadata
-  void CheckRedundant(const NameSpaceElement& element);          // W1004: non-reflected with a list that needs it
+  void CheckNotExported(const NameSpaceElement& element);        // in one
+  void CheckNotInPublicHeader(const NameSpaceElement& element);  // outside of one
+  void CheckReferences(const NameSpaceElement& element);         // to what is not registered
+  void CheckMetadata(const NameSpaceElement& element);           // of what is not reflected
+  void CheckRedundant(const NameSpaceElement& element);          // non-reflected with a list that needs it
 
   const char* SourcePosition() {
     out.Flush();

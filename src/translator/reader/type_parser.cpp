@@ -75,7 +75,7 @@ std::optional<TypeCode> QrexParser::ParseDecoratorType(bool reflected) {
   for (const TemplateName& name : kTemplateNames) {
     if (!Is(name.word)) continue;
     if (name.IsDeprecated()) {
-      ReportWarning(1005, "mvector<T> is deprecated - instead use xvector<movable<pref<T> > >");
+      ReportWarning(Warning::DeprecatedMvector, "mvector<T> is deprecated - instead use xvector<movable<pref<T> > >");
     }
     Advance();
     Expect(kLess, "<");

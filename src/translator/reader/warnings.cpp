@@ -7,39 +7,29 @@
 
 namespace qrex {
 
-namespace {
-
-void WritePosition(TextWriter& out, const ScannedFile& file, const char* position) {
-  std::string path;
-  int64_t line;
-  if (position && file.host.FindSourcePosition(position, path, line)) out << path << "(" << line << ") : ";
-}
-
-}  // namespace
-
 void QrexParser::SeeDeclaration(const NameSpaceElement& element) {
-  TraceWriter trace;
-  WritePosition(trace, file, element.position);
-  trace << "see declaration of ";
-  PrintElement(trace, element);
-  trace << "\n";
+  Message message(Severity::Note, "see declaration of ", PrintedElement(element));
+  message.element = message.text;
+  file.host.FindSourcePlace(element.position, message.place);
+  file.host.Tell(message);
 }
 
-void QrexParser::ReportWarning(int code, std::string_view text, const NameSpaceElement* element, const char* address) {
-  if (!WarningOn(code)) return;
+void QrexParser::ReportWarning(Warning warning, std::string_view text, const NameSpaceElement* element,
+                               const char* address) {
+  if (!WarningOn(warning)) return;
   const char* position = address   ? stream.SourcePosition(address)
                          : element ? element->position
                                    : stream.SourcePosition(scanner.begin);
-  {
-    TraceWriter trace;
-    WritePosition(trace, file, position);
-    trace << "warning W" << code << " : " << text << "\n";
-  }
-  file.host.CountWarning();
+  const int code = static_cast<int>(warning);
+  Message message(Severity::Warning, "warning W" + std::to_string(code) + " : ", std::string(text));
+  message.code = code;
+  if (element) message.element = PrintedElement(*element);
+  file.host.FindSourcePlace(position, message.place);
+  file.host.Tell(message);
 }
 
 void QrexParser::WarnOfText(std::string_view text, const NameSpaceElement& element, const char* address) {
-  if (WantsCompilableText()) ReportWarning(Warnings::kCannotCompile, text, &element, address);
+  if (WantsCompilableText()) ReportWarning(Warning::CannotCompile, text, &element, address);
 }
 
 void QrexParser::CheckPublicHeader(const NameSpaceElement& element) {
@@ -49,36 +39,41 @@ void QrexParser::CheckPublicHeader(const NameSpaceElement& element) {
 
 void QrexParser::CheckNotExported(const NameSpaceElement& element) {
   if (file.file.isPublicHeader && !element.m_exported) {
-    ReportWarning(1009, PrintedElement(element) + " not exported in public header of library", &element);
+    ReportWarning(Warning::UnexportedInPublicHeader,
+                  PrintedElement(element) + " not exported in public header of library", &element);
   }
 }
 
 void QrexParser::CheckNotInPublicHeader(const NameSpaceElement& element) {
   if (!file.file.isPublicHeader && element.m_exported && IsLibrary(GetProject().targetType)) {
-    ReportWarning(1008, PrintedElement(element) + " doesn't appear in public header of library");
+    ReportWarning(Warning::ExportedOutsidePublicHeader,
+                  PrintedElement(element) + " doesn't appear in public header of library");
   }
 }
 
 void QrexParser::CheckMetadata(const NameSpaceElement& element) {
   if (!element.m_reflected && element.ContainsMetaData()) {
-    ReportWarning(1001, "Non-reflected " + PrintedElement(element) + " contains metadata", &element);
+    ReportWarning(Warning::MetadataUnreflected, "Non-reflected " + PrintedElement(element) + " contains metadata",
+                  &element);
   }
 }
 
 void QrexParser::CheckRedundant(const NameSpaceElement& element) {
   if (element.m_reflected) return;
-  ReportWarning(1004, PrintedElement(element) + " is not reflected and has redundant << >> directives", &element);
+  ReportWarning(Warning::RedundantQualifiers,
+                PrintedElement(element) + " is not reflected and has redundant << >> directives", &element);
 }
 
 void QrexParser::CheckReferences(const NameSpaceElement& element) {
-  if (!element.m_reflected || !element.m_strict || !WarningOn(1002)) return;
+  if (!element.m_reflected || !element.m_strict || !WarningOn(Warning::ReferenceUnregistered)) return;
   std::vector<const NameSpaceElement*> references;
   element.CollectReferences(references);
   std::unordered_set<const NameSpaceElement*> seen;
   for (const NameSpaceElement* other : references) {
     if (other->GetDeclStatus() == DeclStatus::Forward || other->EffectivelyRegistered()) continue;
     if (!seen.insert(other).second) continue;
-    ReportWarning(1002, "Reflected " + PrintedElement(element) + " references non-registered " + PrintedElement(*other),
+    ReportWarning(Warning::ReferenceUnregistered,
+                  "Reflected " + PrintedElement(element) + " references non-registered " + PrintedElement(*other),
                   &element);
     SeeDeclaration(*other);
   }
@@ -100,9 +95,9 @@ void ParseWarning(QrexParser& parser) {
       parser.Expect(kColon, ":");
       do {
         const int64_t code = parser.ReadInt64();
-        if (!Warnings::IsCode(code, parser.WantsCompilableText()))
-          parser.Fail("Invalid warning code : " + ToString(code));
-        parser.warnings.Set(static_cast<int>(code), on);
+        const auto warning = Warnings::OfCode(code, parser.WantsCompilableText());
+        if (!warning) parser.Fail("Invalid warning code : " + ToString(code));
+        parser.warnings.Set(*warning, on);
       } while (!parser.Is(kSemicolon) && !parser.Is(kCloseParen));
     } else {
       parser.FailExpected("push/pop/enable/disable");

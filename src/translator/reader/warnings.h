@@ -1,26 +1,50 @@
-// The warnings of the translator: which of them are on.
+// The warnings of the translator, and which of them are on.
 #pragma once
 
 #include <bitset>
 #include <cstdint>
+#include <optional>
 #include <vector>
 
 namespace qrex {
 
+// The numbers are those that users read and write.
+enum class Warning {
+  MetadataOfForward = 1000,
+  MetadataUnreflected,
+  ReferenceUnregistered,
+  IsaNoIObject,
+  RedundantQualifiers,
+  DeprecatedMvector,
+  InconsistentIObject,
+  IObjectUnreflected,
+  ExportedOutsidePublicHeader,
+  UnexportedInPublicHeader,
+  InconsistentSignatures,
+  NotInlineInHeader,
+  UndeclaredInLibrary,
+  IsaUnreflected,
+  ImplementedWithoutIsa,
+  PushWithoutPop,
+  IsaUndefined,
+  DeprecatedExport,
+  // Those of compilableText, without which `$warning` does not know them.
+  CannotCompile,
+  TwoModels,
+  EarlierRelease,
+};
+
 class Warnings {
  public:
-  static constexpr int kFirst = 1000, kLast = 1020;
-  // Those of compilableText, without which `$warning` does not know them.
-  static constexpr int kCannotCompile = 1018;
-  static constexpr int kTwoModels = 1019;
-  static constexpr int kEarlierRelease = 1020;
-  static bool IsCode(int64_t code, bool compilableText) {
-    return code >= kFirst && code <= kLast && (code < kCannotCompile || compilableText);
+  static std::optional<Warning> OfCode(int64_t code, bool compilableText) {
+    const Warning last = compilableText ? kLast : Warning::DeprecatedExport;
+    if (code < static_cast<int>(kFirst) || code > static_cast<int>(last)) return std::nullopt;
+    return static_cast<Warning>(code);
   }
 
   Warnings() { m_on.set(); }
-  bool On(int code) const { return m_on[Index(code)]; }
-  void Set(int code, bool on) { m_on[Index(code)] = on; }
+  bool On(Warning warning) const { return m_on[Index(warning)]; }
+  void Set(Warning warning, bool on) { m_on[Index(warning)] = on; }
   void Push() { m_saved.push_back(m_on); }
   void Pop() {  // only after a Push
     m_on = m_saved.back();
@@ -29,8 +53,9 @@ class Warnings {
   bool HasSaved() const { return !m_saved.empty(); }
 
  private:
-  using Flags = std::bitset<kLast - kFirst + 1>;
-  static size_t Index(int code) { return static_cast<size_t>(code - kFirst); }
+  static constexpr Warning kFirst = Warning::MetadataOfForward, kLast = Warning::EarlierRelease;
+  static constexpr size_t Index(Warning warning) { return static_cast<size_t>(warning) - static_cast<size_t>(kFirst); }
+  using Flags = std::bitset<static_cast<size_t>(kLast) - static_cast<size_t>(kFirst) + 1>;
 
   Flags m_on;
   std::vector<Flags> m_saved;

@@ -56,10 +56,15 @@ bool Symbol::IsDeclaredIn(const IndexSet& files) const {
          std::any_of(m_forward.begin(), m_forward.end(), counts);
 }
 
-NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) const {
-  NameSpaceElement* result = own;
-  auto consider = [&](NameSpaceElement* element) {
-    if (!files.Has(element->owner.index)) return;
+namespace {
+
+// Of the declarations of a name that a file sees, the one that counts.
+class Choice {
+ public:
+  Choice(NameSpaceElement* own, const IndexSet& files) : m_files(files), result(own) {}
+
+  void Consider(NameSpaceElement* element) {
+    if (!m_files.Has(element->owner.index)) return;
     if (!result) {
       result = element;
       return;
@@ -70,15 +75,57 @@ NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) c
       throw LexScannerException("Ambiguous identifier : " + result->name, nullptr);
     }
     if (b > a) result = element;
-  };
-  for (NameSpaceElement* element : m_declared) consider(element);
-  if (m_newest) consider(m_newest);
+  }
+
+ private:
+  const IndexSet& m_files;
+
+ public:
+  NameSpaceElement* result;
+};
+
+}  // namespace
+
+NameSpaceElement* Symbol::Choose(NameSpaceElement* own, const IndexSet& files) const {
+  Choice choice(own, files);
+  for (NameSpaceElement* element : m_declared) choice.Consider(element);
+  if (m_newest) choice.Consider(m_newest);
   const bool mayDiffer = (m_categories & (m_categories - 1)) != 0;
   for (NameSpaceElement* element : m_forward) {
-    if (result && !mayDiffer) break;
-    consider(element);
+    if (choice.result && !mayDiffer) break;
+    choice.Consider(element);
   }
-  return result;
+  return choice.result;
+}
+
+NameSpaceElement* Symbol::ChooseInOrder(NameSpaceElement* own, const IndexSet& files) const {
+  std::vector<NameSpaceElement*> met;
+  const auto meet = [&](NameSpaceElement* element) {
+    if (element->owner.place != 0) met.push_back(element);
+  };
+  std::for_each(m_declared.begin(), m_declared.end(), meet);
+  std::for_each(m_forward.begin(), m_forward.end(), meet);
+  if (m_newest) meet(m_newest);
+  std::sort(met.begin(), met.end(), [](auto* a, auto* b) { return a->owner.place < b->owner.place; });
+  NameSpaceElement* const newest = met.empty() ? nullptr : met.back();
+  if (newest) met.pop_back();
+  Choice choice(own, files);
+  const auto considerAll = [&](bool forward) {
+    for (NameSpaceElement* element : met) {
+      if ((element->GetDeclStatus() == DeclStatus::Forward) == forward) choice.Consider(element);
+    }
+  };
+  considerAll(false);
+  if (newest) choice.Consider(newest);
+  considerAll(true);
+  return choice.result;
+}
+
+void SymbolIndex::Leave(const std::string& key, const NameSpaceElement& element) {
+  const auto found = m_symbols.find(key);
+  if (found == m_symbols.end()) return;
+  found->second.Remove(element);
+  if (found->second.Empty()) m_symbols.erase(found);
 }
 
 const Symbol* SymbolIndex::Find(std::string_view key) const {
@@ -122,7 +169,9 @@ NameSpaceElement* NameSpace::Lookup(std::string_view elementName) {
   NameSpaceElement* own = LookupLocal(elementName);
   if (own && own->category == Category::NameSpace) return own;
   const Symbol* symbol = FindSymbol(elementName);
-  return symbol ? symbol->Choose(own, owner.mounted) : own;
+  if (!symbol) return own;
+  const bool inOrder = owner.host.Symbols().IsFirstPass();
+  return inOrder ? symbol->Choose(own, owner.mounted) : symbol->ChooseInOrder(own, owner.mounted);
 }
 
 NameSpaceElement* NameSpace::LookupPath(std::string_view path) {
@@ -161,6 +210,19 @@ NameSpaceElement& NameSpace::Add(std::unique_ptr<NameSpaceElement> element) {
   slot = std::move(element);
   symbol.Enter(added);
   return added;
+}
+
+// Replaced elements left when they were replaced, but not what a name space among them holds.
+void NameSpace::LeaveIndex() {
+  SymbolIndex& symbols = owner.host.Symbols();
+  const auto leaveWithin = [](NameSpaceElement& element) {
+    if (element.category == Category::NameSpace) static_cast<NameSpace&>(element).LeaveIndex();
+  };
+  for (const auto& [elementName, element] : m_elements) {
+    symbols.Leave(m_keyPrefix + elementName, *element);
+    leaveWithin(*element);
+  }
+  for (const auto& element : m_replaced) leaveWithin(*element);
 }
 
 }  // namespace qrex

@@ -85,11 +85,14 @@ class Symbol {
  public:
   void Enter(NameSpaceElement& element);
   void Remove(const NameSpaceElement& element);
+  bool Empty() const { return !m_newest && m_declared.empty() && m_forward.empty(); }
   bool HasNameSpace(const IndexSet& files) const;
   bool IsDeclaredIn(const IndexSet& files) const;
   // The declaration that counts for a file that sees `files` and holds `own` (or null) itself; or null. Throws
   // "Ambiguous identifier : ".
   NameSpaceElement* Choose(NameSpaceElement* own, const IndexSet& files) const;
+  // The same where files were translated in several passes: as if all of them had been in this one, as far as it is.
+  NameSpaceElement* ChooseInOrder(NameSpaceElement* own, const IndexSet& files) const;
 
  private:
   std::vector<NameSpaceElement*> m_declared;  // in the order of the build, as the next
@@ -103,9 +106,22 @@ class Symbol {
 class SymbolIndex {
  public:
   Symbol& Enter(const std::string& key) { return m_symbols[key]; }
+  void Leave(const std::string& key, const NameSpaceElement& element);
   const Symbol* Find(std::string_view key) const;  // or null
 
+  // A pass goes through the files of a build in their order, and through what they import ahead of each. Where several
+  // declarations of a name are in view, the order of their files counts; a file that is kept from an earlier pass has
+  // its place in this one as if it were translated.
+  void BeginPass() {
+    m_isFirstPass = false;
+    m_places = 0;
+  }
+  bool IsFirstPass() const { return m_isFirstPass; }
+  size_t NextPlace() { return ++m_places; }
+
  private:
+  bool m_isFirstPass = true;
+  size_t m_places = 0;
   struct Hash {
     using is_transparent = void;
     size_t operator()(std::string_view text) const { return std::hash<std::string_view>()(text); }
@@ -134,6 +150,7 @@ class NameSpace : public NameSpaceElement {
   }
   NameSpace* FindOrCreateNameSpace(std::string_view name);           // null: the name is that of another kind
   NameSpaceElement& Add(std::unique_ptr<NameSpaceElement> element);  // sets `parent`; replaces what the map had
+  void LeaveIndex();                                                 // with all elements, ahead of their end
   bool IsRoot() const { return parent == nullptr; }
   bool sharesBrace = false;  // where it was opened last, as `b` of "namespace a::b {"
   bool isInline = false;     // known of C++ of today alone

@@ -23,6 +23,7 @@ bool MayHoldTail(const ProjectFile& source, const ProjectFile& imported) {
 }
 
 void DeclarationRegistry::Update(const std::string& path, const std::vector<std::string>& names) {
+  if (const auto before = takenBack.extract(path)) entries.insert_or_assign(path, before.mapped());
   auto found = entries.find(path);
   if (names.empty()) {
     if (found == entries.end()) return;
@@ -34,14 +35,44 @@ void DeclarationRegistry::Update(const std::string& path, const std::vector<std:
   dirty = true;
 }
 
+void DeclarationRegistry::TakeBack(const std::string& path) {
+  if (auto taken = entries.extract(path)) takenBack.insert(std::move(taken));
+}
+
+bool DeclarationRegistry::IsDirty() {
+  dirty = dirty || !takenBack.empty();
+  takenBack.clear();
+  return dirty;
+}
+
 ScannedFile::ScannedFile(TranslationHost& host, ProjectFile& file)
     : host(host),
       file(file),
       index(host.NextFileIndex()),
       rootNameSpace(std::make_unique<NameSpace>(*this, nullptr, "")) {
+  Begin();
+}
+
+void ScannedFile::Begin() {
   importsIObject = IsIObject(file);
   const bool isCpp = file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::H;
-  if (isCpp && host.Settings().modernCpp) frame.dialect = Dialect::Cpp;
+  frame.dialect = isCpp && host.Settings().modernCpp ? Dialect::Cpp : Dialect::Qrex;
+}
+
+void ScannedFile::TakeBack() {
+  if (!HasBegun()) return;
+  host.TakenBack(*this);
+  rootNameSpace->LeaveIndex();
+  rootNameSpace = std::make_unique<NameSpace>(*this, nullptr, "");
+  frame.Clear();
+  text = {};
+  registrations = {};
+  importClosure = mounted = {};
+  tail.written.clear();
+  state = TranslationState::NotBegun;
+  place = 0;
+  isKept = false;
+  Begin();
 }
 
 std::string ScannedFile::SourcePath() const { return file.project->SourcePath(file); }
@@ -88,24 +119,13 @@ std::string ScannedFile::UseHint(const ScannedFile& imported) const {
   return text;
 }
 
-void ScannedFile::ForgetTranslation() {
-  registerNames.clear();
-  unregisterNames.clear();
-  typeRegistrations.clear();
-  newTails.clear();
-  imports.clear();
-  importClosure = {};
-  importsIObject = IsIObject(file);
-  const bool isCpp = file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::H;
-  if (isCpp && host.Settings().modernCpp) frame.dialect = Dialect::Cpp;
-}
-
 bool ScannedFile::HasTail() const {
-  return hasDeclarations || !typeRegistrations.empty() || !registerNames.empty() || !unregisterNames.empty();
+  return hasDeclarations || !registrations.types.empty() || !registrations.registerNames.empty() ||
+         !registrations.unregisterNames.empty();
 }
 
 bool ScannedFile::MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const {
-  if (!translated) {
+  if (!HasBegun()) {
     trace << "\nNOTE: Need @import instead of #include \"" << file.name
           << "\" to pinpoint errors in original source files\n";
     return false;
@@ -113,14 +133,18 @@ bool ScannedFile::MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std
   if (file.kind == FileKind::H) generatedLine -= kHeaderHeadLines;
   if (generatedLine < 1) return false;
   const char* position = nullptr;
-  if (!lineTable.empty()) {
-    position = lineTable[std::min<size_t>(static_cast<size_t>(generatedLine), lineTable.size()) - 1];
+  if (!text.lines.empty()) {
+    position = text.lines[std::min<size_t>(static_cast<size_t>(generatedLine), text.lines.size()) - 1];
   }
   if (!position) {
     trace << "\nINTERNAL ERROR: convert error position failed because line number invalid\n";
     return false;
   }
-  return host.FindSourcePosition(position, path, line);
+  SourcePlace place;
+  if (!host.FindSourcePlace(position, place)) return false;
+  path = std::move(place.file);
+  line = place.line;
+  return true;
 }
 
 }  // namespace qrex

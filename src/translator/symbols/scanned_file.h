@@ -10,6 +10,7 @@
 #include "macro/frame.h"
 #include "macro/source_map.h"
 #include "text/index_set.h"
+#include "text/message.h"
 #include "translator/symbols/name_space.h"
 #include "workspace/project_model.h"
 
@@ -22,10 +23,14 @@ struct DeclarationRegistry {
   explicit DeclarationRegistry(bool isRegister) : isRegister(isRegister) {}
   // Stores the list of a file (an empty list removes the entry) and sets `dirty` when that changed anything.
   void Update(const std::string& path, const std::vector<std::string>& names);
+  // The list of a file that is about to be translated again: `dirty` only if the next one differs.
+  void TakeBack(const std::string& path);
+  bool IsDirty();  // where each list that was taken back had its chance to come again
 
   bool dirty = false;
   bool isRegister;
   std::map<std::string, std::vector<std::string>> entries;
+  std::map<std::string, std::vector<std::string>> takenBack;
 };
 
 // The project build as the translator sees it; ProjectBuilder implements it.
@@ -43,9 +48,10 @@ class TranslationHost {
   virtual SymbolIndex& Symbols() = 0;  // every declaration of this build
   virtual size_t NextFileIndex() = 0;  // 0, 1, 2, ...: given to each ScannedFile as it is made
   virtual std::vector<const ScannedFile*> FilesOfProject() const = 0;  // those met so far, by path
-  virtual void CountWarning() = 0;
-  // The scanned file whose source text holds the position, and the line there; false when none does.
-  virtual bool FindSourcePosition(const char* position, std::string& path, int64_t& line) const = 0;
+  virtual void Tell(const Message& message) = 0;
+  virtual void TakenBack(ScannedFile& file) = 0;  // ahead of it: nothing that the file holds may be kept
+  // In the scanned file whose source text holds the position; false when none does.
+  virtual bool FindSourcePlace(const char* position, SourcePlace& place) const = 0;
 };
 
 struct TypeRegistration {
@@ -57,6 +63,39 @@ struct TypeRegistration {
 // has its stem.
 bool MayHoldTail(const ProjectFile& source, const ProjectFile& imported);
 
+// How far the translation of a file is. A failed one is begun anew when the file is asked for again.
+enum class TranslationState { NotBegun, Running, Done, Failed };
+
+// What a file reads and how positions lead back to it. Written by its translation alone.
+struct FileText {
+  std::string source;
+  std::string expanded;
+  SourceMap map;                   // from the expanded text to sources
+  std::vector<const char*> lines;  // source position of each generated line, null where unknown
+};
+
+// What a file registers besides its declarations. Written by the handlers of its declarations, read by tails.
+struct Registrations : RegistrationLists {  // $init and $uninit
+  std::vector<TypeRegistration> types;
+};
+
+// Where the reflection tail of a file is. Written by who deals tails out: file/tails and the build.
+struct FileTail {
+  bool isRegistered = false;          // it has been written to an output
+  ScannedFile* holder = nullptr;      // the .cpp in whose output; null where none is known
+  std::vector<ScannedFile*> written;  // of a .cpp: those that its translation wrote
+  bool isLost = false;                // of a .cpp: its output holds a tail that has been written into another one
+};
+
+// Times of a file, as the build knows them; 0 while unknown.
+struct KnownTimes {
+  int64_t source = 0;        // of this file alone
+  int64_t target = 0;        // of the translated file
+  int64_t latestSource = 0;  // the latest of these over the import closure
+  int64_t latestTarget = 0;
+  int64_t translation = 0;  // when the output was last brought up to date
+};
+
 class ScannedFile {
  public:
   ScannedFile(TranslationHost& host, ProjectFile& file);
@@ -65,40 +104,43 @@ class ScannedFile {
   std::string ImportHint(const std::string& path) const;      // where it was looked for, see Hint
   std::string UseHint(const ScannedFile& imported) const;     // of an import that is found and can't be used
   std::string SourcePath() const;
-  void ForgetTranslation();  // what the one before has found, ahead of the next
   // The source position of a 1-based line of the generated text; false (with a message to `trace`) when there is none.
   bool MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const;
-
+  bool HasBegun() const { return state != TranslationState::NotBegun; }
+  bool HasBegunInPass() const { return HasBegun() && !isKept; }
   bool HasTail() const;  // once translated: it leaves something for a reflection tail
+  // As if its translation had not begun, but for what an earlier run could know. No other file may refer to what it has
+  // declared: see file/take_back.h.
+  void TakeBack();
 
   TranslationHost& host;
   ProjectFile& file;
-  std::vector<std::string> registerNames;    // $init
-  std::vector<std::string> unregisterNames;  // $uninit
-  std::vector<TypeRegistration> typeRegistrations;
-  std::vector<const char*> lineTable;  // source position of each generated line, null where unknown
-  bool registered = false;             // its tail has been written to an output
-  ScannedFile* tailHolder = nullptr;   // the .cpp in whose output; null where none is known
-  std::vector<ScannedFile*> newTails;  // of a .cpp: those that its translation wrote
-  bool lostTail = false;               // of a .cpp: its output holds a tail that has been written into another one
-  bool needsWriting = false;
-  std::string sourceText;
-  std::string expandedText;
-  SourceMap expansionMap;
-  std::vector<ScannedFile*> imports;  // direct ones, in order
-  int64_t sourceTime = 0;             // of this file alone; these are caches, 0 while unknown
-  int64_t targetTime = 0;             // of the translated file
-  int64_t latestSourceTime = 0;       // the latest of these over the import closure
-  int64_t latestTargetTime = 0;
-  int64_t translationTime = 0;  // when the output was last brought up to date
-  bool translated = false;
-  bool hasDeclarations = false;
-  const size_t index;           // in the build, for IndexSet
+  const size_t index;  // in the build, for IndexSet
+
+  // --- Written by the translation of the file alone
+  TranslationState state = TranslationState::NotBegun;
+  size_t place = 0;  // among the files of this pass, in the order of their main loops; 0: not met yet
+  FileText text;
+  LSFileFrame frame{host.Settings().context.rootFrame.World()};
+  std::unique_ptr<NameSpace> rootNameSpace;
+  Registrations registrations;
   IndexSet importClosure;       // the files that this one imports, directly or through others
   IndexSet mounted;             // those whose @import was passed: their declarations are visible
   bool importsIObject = false;  // Vesk/vxObject/IObject.h is in the import closure
-  LSFileFrame frame{host.Settings().context.rootFrame.World()};
-  std::unique_ptr<NameSpace> rootNameSpace;
+
+  // --- Written by the translation, and by the build for a file that it need
+  // not translate
+  std::vector<ScannedFile*> imports;  // direct ones, in order
+  bool hasDeclarations = false;
+  FileTail tail;
+
+  // --- Written by the build
+  bool isKept = false;        // translated in an earlier pass, and all of it holds
+  bool needsWriting = false;  // the translation clears it
+  KnownTimes times;           // and sets that of its end
+
+ private:
+  void Begin();
 };
 
 }  // namespace qrex

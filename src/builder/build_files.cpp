@@ -1,0 +1,66 @@
+#include "builder/build_files.h"
+
+#include <algorithm>
+
+namespace qrex {
+
+BuildFiles::BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig& config)
+    : settings(settings), project(project), config(config), paths(project, config) {}
+
+BuildFiles::~BuildFiles() = default;
+
+ScannedFile& BuildFiles::GetScannedFile(ProjectFile& file) {
+  std::unique_ptr<ScannedFile>& slot = scannedByPath[file.path];
+  if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
+  return *slot;
+}
+
+std::vector<const ScannedFile*> BuildFiles::FilesOfProject() const {
+  std::vector<const ScannedFile*> files;
+  for (const auto& [path, file] : scannedByPath) {
+    if (file->file.project == &project && file->place != 0) files.push_back(file.get());
+  }
+  std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
+  return files;
+}
+
+bool BuildFiles::RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) {
+  const auto [entry, isNew] = m_guidOwners.emplace(id, owner);
+  if (!isNew) existingOwner = entry->second;
+  return isNew;
+}
+
+const ScannedFile* BuildFiles::FileOfPosition(const char* position) const {
+  const auto holds = [position](const ScannedFile& file) {
+    return file.HasBegun() && TextRange(std::string_view(file.text.source)).Contains(position);
+  };
+  if (m_lastPositioned && holds(*m_lastPositioned)) return m_lastPositioned;  // messages come in runs
+  for (const auto& [name, file] : scannedByPath) {
+    if (holds(*file)) return m_lastPositioned = file.get();
+  }
+  return nullptr;
+}
+
+bool BuildFiles::FindSourcePlace(const char* position, SourcePlace& place) const {
+  const ScannedFile* const file = position ? FileOfPosition(position) : nullptr;
+  if (!file) return false;
+  const TextRange text{std::string_view(file->text.source)};
+  const auto lines = m_lineStarts.try_emplace(file, text).first;
+  place = {file->SourcePath(), lines->second.LineOf(position), position - text.begin,
+           EndOfWord(text, position) - text.begin};
+  return true;
+}
+
+void BuildFiles::Tell(const Message& message) {
+  if (message.severity == Severity::Warning && message.code != 0) ++warningCount;
+  settings.Tell(message);
+}
+
+void BuildFiles::TakenBack(ScannedFile& file) {
+  m_lineStarts.erase(&file);
+  if (m_lastPositioned == &file) m_lastPositioned = nullptr;
+  registerMap.TakeBack(file.file.path);
+  unregisterMap.TakeBack(file.file.path);
+}
+
+}  // namespace qrex

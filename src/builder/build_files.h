@@ -1,0 +1,67 @@
+// What a project's build knows of its files: the translator's view of the build. Owns every ScannedFile that is met,
+// imported files of other projects included.
+#pragma once
+
+#include <cstdint>
+#include <map>
+#include <memory>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "builder/build_paths.h"
+#include "text/files.h"
+#include "translator/symbols/scanned_file.h"
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+class BuildFiles : public TranslationHost {
+ public:
+  BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig& config);
+  ~BuildFiles() override;
+
+  // --- TranslationHost
+  const ConfigSettings& Settings() const override { return settings; }
+  const ProjectConfig& Config() const override { return config; }
+  ProjectFile* FindFile(const std::string& path) const override { return project.workspace->FindFile(path); }
+  ScannedFile& GetScannedFile(ProjectFile& file) override;
+  std::string TranslatedPath(const ScannedFile& file) const override { return paths.Translated(file.file); }
+  bool RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) override;
+  DeclarationRegistry& RegisterMap() override { return registerMap; }
+  DeclarationRegistry& UnregisterMap() override { return unregisterMap; }
+  SymbolIndex& Symbols() override { return m_symbols; }
+  size_t NextFileIndex() override { return m_nextFileIndex++; }
+  size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
+  std::vector<const ScannedFile*> FilesOfProject() const override;
+  void Tell(const Message& message) override;
+  void TakenBack(ScannedFile& file) override;
+  bool FindSourcePlace(const char* position, SourcePlace& place) const override;
+
+  ConfigSettings& settings;
+  Project& project;
+  ProjectConfig& config;
+  const BuildPaths paths;
+  DeclarationRegistry registerMap{true};
+  DeclarationRegistry unregisterMap{false};
+  std::vector<ScannedFile*> scanned;  // of project.files, in their order
+
+ private:
+  SymbolIndex m_symbols;  // ahead of the files, whose name spaces refer to it
+
+ public:
+  std::unordered_map<std::string_view, std::unique_ptr<ScannedFile>> scannedByPath;
+  FileTimes times;
+  bool dependencyFileLoaded = false;
+  int64_t warningCount = 0;
+
+ private:
+  const ScannedFile* FileOfPosition(const char* position) const;  // whose source text holds it; or null
+
+  std::map<guid, std::string> m_guidOwners;
+  size_t m_nextFileIndex = 0;
+  mutable const ScannedFile* m_lastPositioned = nullptr;
+  mutable std::unordered_map<const ScannedFile*, LineStarts> m_lineStarts;  // of those that messages were about
+};
+
+}  // namespace qrex

@@ -1,0 +1,95 @@
+#include "platform/interpreter.h"
+
+#include <algorithm>
+#include <string_view>
+
+#include "platform/file_system.h"
+#include "platform/system.h"
+
+namespace qrex::platform {
+
+namespace {
+
+// The batch file that marks a manifest's update is the one that this system has to carry out:
+// `@echo TEXT >"FILE"`, with %TIME% and %DATE%.
+int RunBatch(std::string path) {
+  std::replace(path.begin(), path.end(), '\\', '/');
+  std::string content;
+  if (!ReadFile(path, content)) return 1;
+  const size_t begin = content.find("@echo "), arrow = content.rfind(" >\""), end = content.rfind('"');
+  if (begin != 0 || arrow == std::string::npos || end <= arrow + 3) return 1;
+  std::string text = content.substr(6, arrow - 6);
+  std::string target = content.substr(arrow + 3, end - arrow - 3);
+  std::replace(target.begin(), target.end(), '\\', '/');
+  const LocalTime now = CurrentLocalTime();
+  auto replace = [&](std::string_view name, const std::string& value) {
+    const size_t at = text.find(name);
+    if (at != std::string::npos) text.replace(at, name.size(), value);
+  };
+  replace("%TIME%", std::to_string(now.hour) + ":" + std::to_string(now.minute) + ":" + std::to_string(now.second));
+  replace("%DATE%", std::to_string(now.day) + "/" + std::to_string(now.month) + "/" + std::to_string(now.year));
+  return !IsReadOnlyFile(target) && WriteFile(target, text + "\n") ? 0 : 1;
+}
+
+bool IsPlainInShell(char c) {
+  return (c >= 'a' && c <= 'z') || (c >= 'A' && c <= 'Z') || (c >= '0' && c <= '9') || (c & 0x80) != 0 ||
+         std::string_view("_@%+=:,./-").find(c) != std::string_view::npos;
+}
+
+// The line for the shell, in which more characters have a meaning than in the interpreter that it was written for.
+std::string ForShell(std::string_view line) {
+  std::string text;
+  bool isQuoted = false, isWordStart = true;
+  for (; !line.empty(); line.remove_prefix(1)) {
+    const char c = line.front();
+    if (!isQuoted && isWordStart && (line.starts_with("1>") || line.starts_with("2>"))) {
+      const size_t length = line.starts_with("2>&1") ? 4 : 2;
+      text += line.substr(0, length);
+      line.remove_prefix(length - 1);
+      continue;
+    }
+    isWordStart = !isQuoted && (c == ' ' || c == '\t' || c == '\n' || c == '\r');
+    if (line.starts_with("\\\"")) {  // a tool's own way to write a quote
+      text += line.substr(0, 2);
+      line.remove_prefix(1);
+    } else if (c == '"') {
+      text += c;
+      isQuoted = !isQuoted;
+    } else if (isWordStart) {
+      text += ' ';
+    } else {
+      const bool hasMeaning =
+          isQuoted ? std::string_view("$`\\").find(c) != std::string_view::npos : !IsPlainInShell(c);
+      if (hasMeaning) text += '\\';
+      text += c;
+    }
+  }
+  return text;
+}
+
+std::string WithoutInterpreter(const std::string& line) {
+  constexpr std::string_view kInterpreter = "cmd /c ";
+  return line.starts_with(kInterpreter) ? line.substr(kInterpreter.size()) : line;
+}
+
+}  // namespace
+
+std::string ForInterpreter(const std::string& line) {
+  constexpr std::string_view kCompiler = "gcc-4 ";
+  std::string command = WithoutInterpreter(line);
+  if (command.starts_with(kCompiler) && FindProgram("gcc-4").empty()) command.erase(3, 2);
+  return ForShell(command);
+}
+
+bool IsBatchFile(const std::string& line) {
+  constexpr std::string_view kEnd = ".bat\"";
+  const std::string command = WithoutInterpreter(line);
+  return command.starts_with('"') && command.size() > kEnd.size() + 1 && command.ends_with(kEnd);
+}
+
+int RunBatchFile(const std::string& line) {
+  const std::string command = WithoutInterpreter(line);
+  return RunBatch(command.substr(1, command.size() - 2));
+}
+
+}  // namespace qrex::platform

@@ -1,0 +1,17 @@
+// Lines for the command interpreter, which have the form of the one that they were written for: "cmd /c REST" runs
+// REST; "..." is taken as it stands, and outside of it 1>FILE, 2>FILE and 2>&1 redirect; nothing else has a meaning, so
+// that a line runs the one tool that it begins with.
+#pragma once
+
+#include <string>
+
+namespace qrex::platform {
+
+constexpr char kInterpreterPath[] = "/bin/sh";
+std::string ForInterpreter(const std::string& line);  // the line as the shell of this system reads it
+
+// The batch file that marks a manifest's update is the one that this system has to carry out itself.
+bool IsBatchFile(const std::string& line);
+int RunBatchFile(const std::string& line);  // its exit code
+
+}  // namespace qrex::platform
