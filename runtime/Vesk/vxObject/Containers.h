@@ -65,7 +65,11 @@ class xvector : public Assignable<std::vector<T>> {
   // The items may be its own.
   iterator insert(const_iterator at, T const* first, T const* last) {
     if (at - base::cbegin() > base::cend() - base::cbegin()) throw std::out_of_range("position to insert at");
-    if (last - first == 1) return base::insert(at, *first);
+    if (last - first == 1) {
+      if (at != base::cend()) return base::insert(at, *first);
+      base::push_back(*first);
+      return base::end() - 1;
+    }
     if (!IsOwn(first)) return base::insert(at, first, last);
     const base items(first, last);
     return base::insert(at, items.begin(), items.end());

@@ -1,7 +1,8 @@
 // The dependency graph. A node that is read while another one is being calculated becomes an input of that one. A
 // change of an input makes everything behind it dirty, without calculating anything. A dirty node is brought up to date
 // when it is next read: its inputs first, and itself only if one of them really changed. Chains may be of any length:
-// what is dirty, and what has to be looked at, is kept in work lists, not on the stack.
+// what is dirty, and what has to be looked at, is kept in work lists, and calculations within each other go on on a
+// stack of their own.
 //
 // A calculation may write what it has read. The value that it answers stands until the outermost read ends; then the
 // node is dirty again. One that throws leaves its node dirty; the error is not looked for twice within one read.
@@ -100,6 +101,7 @@ class DGNode : private QueuePlace, private ChangePlace {
   static xvector<DGNode const*> NodesOf(Links const& links);
   static void MakeRoom(Links& links);
   void TellDependents() const;
+  void TellTheOne() const;
 
   void BringUpToDate(GraphState& state) const;
   void BeginRead(GraphState& state) const;
@@ -107,6 +109,8 @@ class DGNode : private QueuePlace, private ChangePlace {
   void Update(GraphState& state) const;
   void LookAtInputs(GraphState& state) const;
   void Calculate(GraphState& state) const;
+  void CalculateHere(GraphState& state) const;
+  void CalculateElsewhere(GraphState& state) const;
   void Recalculate(GraphState& state) const;
 
   void Mark(bool hard, Changes& dirty) const;
@@ -114,6 +118,7 @@ class DGNode : private QueuePlace, private ChangePlace {
     if (again > m_again) m_again = again;
   }
   static void Spread(GraphState& state, Changes& dirty);
+  static void Tell(Changes& dirty);
 
   void Forget() const;
   void DropDependents(GraphState* state, Changes& dirty) const;
@@ -131,6 +136,15 @@ class DGNode : private QueuePlace, private ChangePlace {
   mutable EvictionQueue* m_queue = nullptr;  // where it is queued
   mutable std::size_t m_unwound = 0;         // the serial of the target that it waits for
 };
+
+inline Calculation::Calculation(GraphState& state, DGNode const* node)
+    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
+  if (node) node->m_isCalculating = true;
+}
+inline Calculation::~Calculation() {
+  if (m_node) m_node->m_isCalculating = false;
+  m_state.m_calculation = m_outer;
+}
 
 // The node of a `$dep` field.
 class DGDepNode : public DGNode {

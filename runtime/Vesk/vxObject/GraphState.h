@@ -1,6 +1,7 @@
 // What a thread keeps while it works on its dependency graphs: the calculation that runs, what the outermost read has
 // found out, and the eviction queues. It lives as long as the thread or the last node in a queue.
 
+@import "Vesk/vxObject/CalculationStack.h"
 @import "Vesk/vxObject/Visitors.h"
 #include <exception>
 #include <memory>
@@ -27,7 +28,7 @@ class GraphError : public std::logic_error {
 // it is none of their business.
 struct DeepRead {};
 
-// The stack that calculations within each other may use.
+// What calculations within each other may use of a thread's own stack.
 constexpr std::uintptr_t MostCalculationStack = 256 * 1024;
 
 // One T for each thread. It is there for nodes that outlive the thread's other variables, and gone when nobody uses
@@ -185,6 +186,7 @@ struct GraphState : PerThread<GraphState> {
   // Whether what is read next must be calculated further out. Not what the outermost calculation reads: that is
   // there.
   bool IsDeep() const;
+  void MeasureStack(std::uintptr_t most);
 
   void OnDestroy(DGNode const* node);
   // The calculation that runs goes on without something that it wanted to read: its value is not to be kept.
@@ -195,7 +197,9 @@ struct GraphState : PerThread<GraphState> {
 
   // Of the outermost read.
   bool m_isEvaluating = false;
-  std::uintptr_t m_stack = 0;
+  std::uintptr_t m_stack = 0;  // where the calculations began to use the stack, and how much they may
+  std::uintptr_t m_mostStack = 0;
+  CalculationStack m_otherStacks[4];
   DGNode const* m_deep = nullptr;  // the node of the DeepRead that is on its way
   xvector<Target> m_targets;
   std::size_t m_lastSerial = 0;

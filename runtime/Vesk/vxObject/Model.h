@@ -41,15 +41,26 @@ class ModelHook {
   static void Notify(ModelChange const& change);
   static bool Any() {
     Hooks const* hooks = Hooks::Peek();
-    return hooks && !hooks->m_list.empty();
+    return hooks && !hooks->m_list.IsEmpty();
   }
 
  private:
-  struct Hooks : PerThread<Hooks> {
-    std::list<ModelHook*> m_list;
+  // A hook's function, which stays in its place while it is called, though the hook be gone.
+  struct Called : NodePlace {
+    Function m_function;
+    std::size_t m_serial;
+    ssize_t m_users = 1;  // the hook is one
+    bool m_isOver = false;
   };
-  Function m_function;
+  struct Hooks : PerThread<Hooks> {
+    NodeList<Called> m_list;
+    std::size_t m_lastSerial = 0;
+  };
+  struct Use;
+  static void Release(Called const& called);
+
   Hooks& m_hooks;
+  Called* m_called;
 };
 
 // --- Barriers

@@ -4,6 +4,7 @@
 @import "Vesk/vxObject/Graph.h"
 
 #include <algorithm>
+#include <iterator>
 
 namespace vesk {
 
@@ -16,7 +17,12 @@ GraphState::~GraphState() {}
 
 void GraphState::Begin() {
   m_isEvaluating = true;
+  MeasureStack(MostCalculationStack);
+}
+
+inline void GraphState::MeasureStack(std::uintptr_t most) {
   m_stack = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
+  m_mostStack = most;
 }
 
 void GraphState::Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
@@ -34,7 +40,7 @@ inline bool GraphState::IsWaiting(DGNode const* node) const {
 
 inline bool GraphState::IsDeep() const {
   const std::uintptr_t here = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
-  return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > MostCalculationStack;
+  return m_calculation && m_calculation->m_outer && m_stack > here && m_stack - here > m_mostStack;
 }
 
 void GraphState::OnDestroy(DGNode const* node) {
@@ -111,10 +117,12 @@ void DGNode::Link(GraphState& state) const {
 }
 
 // Takes a link out of a list of links; the last one takes its place. `backwards`: the lists at the other ends.
-void DGNode::Drop(Links& links, Links DGNode::*backwards, std::size_t at) {
-  links[at] = links.back();
+inline void DGNode::Drop(Links& links, Links DGNode::*backwards, std::size_t at) {
+  if (at + 1 < links.size()) {
+    links[at] = links.back();
+    (const_cast<DGNode*>(links[at].m_node)->*backwards)[links[at].m_at].m_at = at;
+  }
   links.pop_back();
-  if (at < links.size()) (const_cast<DGNode*>(links[at].m_node)->*backwards)[links[at].m_at].m_at = at;
 }
 
 // Leaves the graph behind it.
@@ -169,7 +177,11 @@ void DGNode::Spread(GraphState& state, Changes& dirty) {
   for (NodePlace const* at = dirty.First(); at != dirty.End(); at = at->m_next) {
     for (NodeLink const& link : Changed(at)->m_dependents) link.m_node->Mark(false, dirty);
   }
+  if (!state.m_calculation) return Tell(dirty);
   Calculation detached(state, nullptr);
+  Tell(dirty);
+}
+inline void DGNode::Tell(Changes& dirty) {
   while (!dirty.IsEmpty()) {
     DGNode const* node = Changed(dirty.First());
     dirty.First()->Leave();
@@ -192,13 +204,30 @@ void DGNode::InvalidateDependents() const {
 
 void DGNode::TellDependents() const {
   GraphState& state = GraphState::Get();
+  if (!state.m_calculation && m_dependents.size() == 1 && m_dependents[0].m_node->m_dependents.empty()) {
+    return TellTheOne();
+  }
   Changes dirty;
   DropDependents(&state, dirty);
   OnNoDependents();
   Spread(state, dirty);
 }
+// What is most often so: one value depends on the node, nothing on that, and nothing is being calculated.
+inline void DGNode::TellTheOne() const {
+  DGNode const* node = m_dependents[0].m_node;
+  Drop(node->m_inputs, &DGNode::m_dependents, m_dependents[0].m_at);
+  m_dependents.clear();
+  const bool wasClean = std::exchange(node->m_state, EState::Hard) == EState::Clean;
+  OnNoDependents();
+  if (wasClean) node->OnInvalidate();
+}
 
 void DGNode::Change(Changes& nodes) {
+  if (nodes.First()->m_next == nodes.End()) {
+    DGNode const* node = Changed(nodes.First());
+    nodes.First()->Leave();
+    return node->Change();
+  }
   GraphState& state = GraphState::Get();
   Changes dirty;
   while (!nodes.IsEmpty()) {
@@ -213,6 +242,7 @@ void DGNode::Change(Changes& nodes) {
 // --- Calculating
 
 void DGNode::BringUpToDate(GraphState& state) const {
+  if (!state.m_calculation && !state.m_isEvaluating) return BeginRead(state);
   FailedRead failed{state, this, state.m_calculation ? state.m_calculation->m_node : nullptr};
   if (m_isCalculating) throw GraphError("cyclic dependency: " + Name());
   if (!state.m_isEvaluating) {
@@ -300,13 +330,40 @@ void DGNode::LookAtInputs(GraphState& state) const {
 
 void DGNode::Calculate(GraphState& state) const {
   if (m_isCalculating) throw GraphError("cyclic dependency: " + Name());
-  const auto failed = state.m_failed.find(this);
-  if (failed != state.m_failed.end()) std::rethrow_exception(failed->second);
+  if (!state.m_failed.empty()) {
+    const auto failed = state.m_failed.find(this);
+    if (failed != state.m_failed.end()) std::rethrow_exception(failed->second);
+  }
   if (state.IsWaiting(this)) throw GraphError("cyclic dependency: " + Name());
-  if (state.IsDeep()) {
+  if (state.IsDeep()) return CalculateElsewhere(state);
+  CalculateHere(state);
+}
+
+// On the next stack; where all are used up, or there is none, further out.
+void DGNode::CalculateElsewhere(GraphState& state) const {
+  CalculationStack* const end = std::end(state.m_otherStacks);
+  CalculationStack* const next =
+      std::find_if(std::begin(state.m_otherStacks), end, [](CalculationStack& stack) { return stack.Open(); });
+  if (next == end) {
     state.m_deep = this;
     throw DeepRead();
   }
+  struct Stack {
+    ~Stack() {
+      m_state.m_stack = m_stack;
+      m_state.m_mostStack = m_most;
+    }
+    GraphState& m_state;
+    std::uintptr_t m_stack = m_state.m_stack, m_most = m_state.m_mostStack;
+  } stack{state};
+  const auto calculate = [&] {
+    state.MeasureStack(next->Usable());
+    CalculateHere(state);
+  };
+  next->Run(calculate);
+}
+
+void DGNode::CalculateHere(GraphState& state) const {
   try {
     Recalculate(state);
   } catch (DeepRead const&) {
@@ -341,15 +398,6 @@ inline void DGNode::Recalculate(GraphState& state) const {
   Changes dirty;
   for (NodeLink const& link : m_dependents) link.m_node->Mark(true, dirty);
   Spread(state, dirty);
-}
-
-Calculation::Calculation(GraphState& state, DGNode const* node)
-    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
-  if (node) node->m_isCalculating = true;
-}
-Calculation::~Calculation() {
-  if (m_node) m_node->m_isCalculating = false;
-  m_state.m_calculation = m_outer;
 }
 
 void Calculation::Forget(DGNode const* node, DGNode const* input) {
@@ -401,6 +449,7 @@ inline void Empty(xvector<T>& list) {
 void GraphState::End() {
   m_isEvaluating = false;
   m_deep = nullptr;
+  for (CalculationStack& stack : m_otherStacks) stack.Close();
   Empty(m_failed);
   Empty(m_targets);
   Empty(m_steps);

@@ -3,7 +3,6 @@
 @import "Vesk/vxObject/Model.h"
 
 #include <algorithm>
-#include <list>
 
 namespace vesk {
 
@@ -96,21 +95,40 @@ xstring ModelChange::PathText() const {
   return m_name || !m_class ? xstring(m_name ? m_name : "") : vesk::PathText(*m_class, m_path);
 }
 
-ModelHook::ModelHook(Function function) : m_function(std::move(function)), m_hooks(Hooks::Get()) {
-  m_hooks.m_list.push_back(this);
+ModelHook::ModelHook(Function function) : m_hooks(Hooks::Get()), m_called(new Called) {
+  m_called->m_function = std::move(function);
+  m_called->m_serial = ++m_hooks.m_lastSerial;
+  m_hooks.m_list.Append(*m_called);
   m_hooks.Use();
 }
 ModelHook::~ModelHook() {
-  m_hooks.m_list.remove(this);
+  m_called->m_isOver = true;
+  Release(*m_called);
   m_hooks.Release();
 }
 
+void ModelHook::Release(Called const& called) {
+  Called& own = const_cast<Called&>(called);
+  if (--own.m_users == 0) delete &own;
+}
+
+struct ModelHook::Use {
+  explicit Use(NodePlace const* place) : m_called(const_cast<Called&>(*static_cast<Called const*>(place))) {
+    ++m_called.m_users;
+  }
+  ~Use() { Release(m_called); }
+  Called& m_called;
+};
+
+// Those that are made meanwhile are not called.
 void ModelHook::Notify(ModelChange const& change) {
-  std::list<ModelHook*> const& hooks = Hooks::Get().m_list;
-  for (ModelHook* hook : std::list<ModelHook*>(hooks)) {
-    if (std::find(hooks.begin(), hooks.end(), hook) == hooks.end()) continue;
-    const Function function = hook->m_function;
-    function(change);
+  Hooks& hooks = Hooks::Get();
+  const std::size_t last = hooks.m_lastSerial;
+  for (NodePlace const* at = hooks.m_list.First(); at != hooks.m_list.End();) {
+    const Use use(at);
+    if (use.m_called.m_serial > last) break;
+    if (!use.m_called.m_isOver) use.m_called.m_function(change);
+    at = at->m_next;
   }
 }
 

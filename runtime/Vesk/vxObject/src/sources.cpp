@@ -214,7 +214,7 @@ class PathNode : public Source {
     IdleSources& idle = IdleSources::Get();
     idle.MakeRoom();
     Table& table = Table::Get();
-    PathMap& paths = table.m_byObject[object];
+    PathMap& paths = table.Make(object);
     const auto at = paths.find(Bytes(path));
     PathNode const* node = at != paths.end() ? at->second : new PathNode(idle, table, object, paths, Bytes(path));
     node->Read(state);
@@ -223,18 +223,51 @@ class PathNode : public Source {
   static void OnWrite(void const* object, Path const& path) {
     Table* table = Table::Peek();
     if (!table) return;
-    const auto object_ = table->m_byObject.find(object);
-    if (object_ == table->m_byObject.end()) return;
+    PathMap const* paths = table->Find(object);
+    if (!paths) return;
     Changes found;
-    FindInside(object_->second, Bytes(path), found);
-    FindAround(object_->second, Bytes(path), found);
+    FindInside(*paths, Bytes(path), found);
+    FindAround(*paths, Bytes(path), found);
     if (!found.IsEmpty()) Change(found);
   }
 
  private:
-  typedef std::map<std::string, PathNode*, std::less<>> PathMap;
+  // As memcmp, without a call: paths are short.
+  struct PathLess {
+    typedef void is_transparent;
+    bool operator()(std::string_view a, std::string_view b) const {
+      const std::size_t same = std::min(a.size(), b.size());
+      for (std::size_t i = 0; i < same; ++i) {
+        if (a[i] != b[i]) return static_cast<octet_t>(a[i]) < static_cast<octet_t>(b[i]);
+      }
+      return a.size() < b.size();
+    }
+  };
+  typedef std::map<std::string, PathNode*, PathLess> PathMap;
   struct Table : PerThread<Table> {
+    // Those of an object, which is most often the one of the last call.
+    PathMap* Find(void const* object) {
+      if (m_lastPaths && m_lastObject == object) return m_lastPaths;
+      const auto at = m_byObject.find(object);
+      return at != m_byObject.end() ? Remember(object, at->second) : nullptr;
+    }
+    PathMap& Make(void const* object) {
+      PathMap* paths = Find(object);
+      return paths ? *paths : *Remember(object, m_byObject[object]);
+    }
+    void Drop(void const* object) {
+      m_lastPaths = nullptr;
+      m_byObject.erase(object);
+    }
+
+   private:
+    PathMap* Remember(void const* object, PathMap& paths) {
+      m_lastObject = object;
+      return m_lastPaths = &paths;
+    }
     std::unordered_map<void const*, PathMap> m_byObject;
+    void const* m_lastObject = nullptr;
+    PathMap* m_lastPaths = nullptr;
   };
 
   PathNode(IdleSources& idle, Table& table, void const* object, PathMap& paths, std::string_view path)
@@ -244,7 +277,7 @@ class PathNode : public Source {
   }
   ~PathNode() override {
     m_paths.erase(m_place);
-    if (m_paths.empty()) m_table.m_byObject.erase(m_object);
+    if (m_paths.empty()) m_table.Drop(m_object);
     m_table.Release();
   }
 

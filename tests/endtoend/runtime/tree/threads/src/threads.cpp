@@ -29,7 +29,11 @@ public:
 $struct Chained {
     Chained* previous = nullptr;
     $indep int32 x;
-    $dep int32 depth = { depth = x + (previous ? previous->depth.read() : 0); };
+    $dep int32 depth =
+    {
+        if (x < 0) throw std::range_error("negative");
+        depth = x + (previous ? previous->depth.read() : 0);
+    };
 };
 $function Part* MakePart();
 $function Part* MakePart() { return $new Part(); }
@@ -49,6 +53,23 @@ int CallSum(int rounds) {
         vesk::Value::Of(sum).Find("total").Set(int32(total + 1));
     }
     return total;
+}
+
+// What the end of a chain says which needs more stacks than one; the error at its beginning comes to the end.
+int Deep() {
+    vesk::xvector<Chained> chain(5000);
+    for (std::size_t i = 1; i < chain.size(); ++i) chain[i].previous = &chain[i - 1];
+    for (Chained& link : chain) link.x = 1;
+    const int length = chain.back().depth;
+    chain[0].x = -1;
+    for (Chained& link : chain) link.depth.TryEvict(true);
+    try {
+        chain.back().depth.read();
+    } catch (std::range_error const&) {
+        chain[0].x = 2;
+        return length + chain.back().depth;
+    }
+    return 0;
 }
 
 int Work(int rounds) {
@@ -93,7 +114,7 @@ int main() {
         vesk::xostream& os = vesk::xout();
         for (int i = 0; i < 20; ++i) os << "a line\n";
         os.ChangeIndent(4);
-        result = Work(20);
+        result = Work(20) + Deep() - 10001;
         os.ChangeIndent(-4);
     };
     for (int i = 0; i < 4; ++i) threads[i] = std::thread(work, std::ref(results[i]));
