@@ -119,6 +119,8 @@ TEST_F(ConfigTest, Messages) {
            {"\n\nmoed = clean", "(3) : Syntax error: moed"},
            {"translateOnly = yes", "(1) : Expected false/true after = when read yes"},
            {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},
+           {"jobs = -1", "(1) : Expected number after = when read -"},
+           {"jobs = 9999999", "(1) : Expected number after = when read 9999999"},
            {"PATH('a') = { }", "(1) : Expected double quoted string after ( when read 'a'"},
            {"PATH = { }", "(1) : Expected ( after PATH when read ="},
            {"LIB(\"a\") { }", "(1) : Expected = after ) when read {"},
