@@ -1,7 +1,6 @@
 #include "builder/run_command.h"
 
 #include "lex/token.h"
-#include "platform/console.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/output_policy.h"
@@ -84,9 +83,9 @@ platform::Processes::Id StartCommand(platform::Processes& tools, const Command& 
   if (command.capturesErrors) DeleteThoughReadOnly(kErrorFile);
   if (command.echo) TraceWriter() << LineOf(command) << "\n";
   return tools.Start({.line = command.line,
-                      .output = command.capturesOutput || command.holdsText ? Stream::Captured : Stream::Inherited,
+                      .output = command.capturesOutput ? Stream::Captured : Stream::Inherited,
                       .errors = command.capturesErrors ? Stream::Captured : Stream::Inherited,
-                      .errorsIntoOutput = command.errorsIntoOutput || (command.holdsText && !command.capturesOutput)});
+                      .errorsIntoOutput = command.errorsIntoOutput});
 }
 
 CommandResult EndCommand(const Command& command, platform::Processes::Ended ended) {
@@ -105,9 +104,6 @@ CommandResult EndCommand(const Command& command, platform::Processes::Ended ende
   }
   if (ended.end.IsInterrupt()) {
     throw LexScannerException("Interrupted while running " + std::string(ToolOf(command.line)), nullptr);
-  }
-  if (command.holdsText && !command.capturesOutput) {
-    platform::WriteStdout(ended.output.Take().value_or("ERROR getting stdout\n"));
   }
   if (!ended.end.IsNormal()) ReportAbnormalEnd(command.line, ended.end);
   if (result.ReturnCode() != 0 && command.failOnNonZero) {

@@ -19,7 +19,6 @@ struct Command {
   bool errorsIntoOutput = false;  // the error stream joins the captured output
   bool failOnNonZero = false;
   bool failOnErrorText = false;
-  bool holdsText = false;  // what is not captured is written when it has ended, not as it comes
 };
 
 struct CommandResult {

@@ -7,6 +7,8 @@
 namespace qrex {
 
 void Scheduler::Add(std::unique_ptr<BuildStep> step, std::function<void(bool)> whenOver) {
+  while (!m_begun.empty() && WaitForOne(0)) {  // what has ended meanwhile is told at once, an interrupt most of all
+  }
   Begun begun;
   begun.step = std::move(step);
   begun.whenOver = std::move(whenOver);
@@ -48,13 +50,13 @@ void Scheduler::RunNext(Begun& begun) {
   begun.id = StartCommand(m_tools, begun.command);
 }
 
-void Scheduler::WaitForOne(int milliseconds) {
+bool Scheduler::WaitForOne(int milliseconds) {
   std::optional<platform::Processes::Ended> ended = m_tools.WaitForAny(milliseconds);
-  if (!ended) return;
+  if (!ended) return false;
   const auto begun = std::find_if(m_begun.begin(), m_begun.end(), [&](const Begun& each) {
     return !each.isOver && !each.ended && each.id == ended->id;
   });
-  if (begun == m_begun.end()) return;
+  if (begun == m_begun.end()) return true;
   if (ended->end.IsInterrupt()) {  // by the user, of all
     const Command command = begun->command;
     Abandon();
@@ -63,6 +65,7 @@ void Scheduler::WaitForOne(int milliseconds) {
   begun->ended = std::move(ended);
   FinishInOrder();
   if (m_jobServer) m_jobServer->KeepTokens(std::max<size_t>(RunningCount(), 1) - 1);
+  return true;
 }
 
 void Scheduler::FinishInOrder() {

@@ -42,7 +42,7 @@ class Scheduler {
 
   void RunNext(Begun& begun);
   void AwaitToken();
-  void WaitForOne(int milliseconds = platform::Processes::kForever);
+  bool WaitForOne(int milliseconds = platform::Processes::kForever);  // false: none has ended in that time
   void HoldTraceBehind();
   void FinishInOrder();
   size_t RunningCount() const;

@@ -25,7 +25,7 @@ constexpr size_t kLongestPath = 32'767;           // of any system; beyond it co
 constexpr int64_t kLastLine = 1'000'000'000'000;  // no file is longer; further digits of a number are only passed over
 
 // A message in a line: where the file name ends, the number, and the text behind.
-struct Message {
+struct MessageInLine {
   std::string_view file;
   int64_t line = 0;
   std::string_view rest;
@@ -54,7 +54,7 @@ class OutputScanner {
     const size_t begin = line.find_first_not_of(" \t\v\f\r");
     if (begin == std::string_view::npos) return;
     for (size_t at = begin; at < line.size() && StandsInFileName(line[at]);) {
-      Message message;
+      MessageInLine message;
       if (ReadMessage(line, begin, at, message)) {
         Count(message.rest);
         PointAtSource(line.substr(0, begin), message);
@@ -66,7 +66,7 @@ class OutputScanner {
   }
 
   // Is the number of a message behind the `(` or `:` at `at`?
-  bool ReadMessage(std::string_view line, size_t begin, size_t at, Message& message) const {
+  bool ReadMessage(std::string_view line, size_t begin, size_t at, MessageInLine& message) const {
     const char opening = line[at];
     const bool isColonForm = opening == ':' && IsGccFamily(m_builder.settings.compiler);
     if (opening != '(' && !isColonForm) return false;
@@ -108,7 +108,7 @@ class OutputScanner {
     }
   }
 
-  void PointAtSource(std::string_view indentation, const Message& message) {
+  void PointAtSource(std::string_view indentation, const MessageInLine& message) {
     if (message.file.size() > kLongestPath) return;
     // A compiler tells how it came to a file: from here or not, with `.` and `..` as its include paths have them.
     std::string file(message.file);

@@ -121,10 +121,7 @@ class ResourceObjectStep : public BuildStep {
       ++m_builder.errorCount;
       return std::nullopt;
     }
-    return Command{.line = line.TakeText(),
-                   .echo = m_builder.settings.diagnostics,
-                   .failOnNonZero = true,
-                   .holdsText = m_builder.scheduler.Overlaps()};
+    return Command{.line = line.TakeText(), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
   }
 
   void Finish(const CommandResult& result) override {

@@ -113,8 +113,8 @@ TEST_F(StepsTest, StepsAreFinishedInTheirOrder) {
 }
 
 TEST_F(StepsTest, AnInterruptEndsAllSteps) {
-  AddTool("writes", "echo half > \"$1\"; touch begun; sleep 30\n");
-  AddTool("stopped", "while [ ! -e begun ]; do sleep 0.01; done; kill -INT $$\n");
+  AddTool("writes", "echo half > \"$1\"; sleep 30\n");
+  AddTool("stopped", "while [ ! -e y ]; do sleep 0.01; done; kill -INT $$\n");
   std::string notes;
   Scheduler scheduler(settings.tools, 3);
   EXPECT_EQ("Interrupted while running stopped", MessageOf([&] {
