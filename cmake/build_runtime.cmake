@@ -2,8 +2,8 @@
 # Included with
 #   STEP                   prepare; Debug, Release: the configuration to build; gather
 #   SOURCE                 the checkout
-#   FOLDER                 where it is built. What is to be installed comes to stand in FOLDER/runtime, a root for virtualTree,
-#                          and FOLDER/include, its headers as they are translated.
+#   FOLDER                 where it is built; what was told of that is in CONFIG/log. What is to be installed comes to stand in
+#                          FOLDER/runtime, a root for virtualTree, and FOLDER/include, its headers as they are translated.
 #   QREX, RELEASE          the program and its release
 #   COMPILER, CXX, STRIP   the compiler's word in configurations, its command; what takes debug information out of a library
 set(tree ${FOLDER}/tree)
@@ -81,10 +81,12 @@ PATH("x64") = { "/usr/lib/ccache" "@tools@" "/usr/local/bin" "/usr/bin" "/bin" }
 INCLUDE("x64") = { "/usr/include" } LIB("x64") = { "/usr/lib" }
 modernCpp = true compilableText = true
 makeTranslatedFilesReadOnly = false makeExportedHeaderFilesReadOnly = false
+jobs = 0 failOnErrors = true
 ]] @ONLY)
   set(ENV{CCACHE_NOHASHDIR} 1)  # what differs with the folder is debug information, which is taken out
   execute_process(COMMAND ${QREX} all.qrex WORKING_DIRECTORY ${own} OUTPUT_VARIABLE told RESULT_VARIABLE status)
-  if(NOT status EQUAL 0 OR NOT told MATCHES "\nCompleted\\.\\.")
+  file(APPEND ${own}/log "${told}")
+  if(NOT status EQUAL 0)
     message(FATAL_ERROR "The runtime could not be built:\n${told}")
   endif()
 endfunction()

@@ -40,6 +40,8 @@ def installed(test):
 @installed
 def components(prefix, work):
     equal([name for name in INSTALLED + RUNTIME if not (prefix / name).is_file()], [])
+    logs = [path.read_text() for path in Path(sys.argv[1]).resolve().parent.glob("built/*/log")]
+    equal((len(logs), [log for log in logs if "warning" in log]), (2, []))
 
 
 PAGE = Path(__file__).resolve().parents[2] / "docs/install.md"

@@ -137,15 +137,6 @@ class DGNode : private QueuePlace, private ChangePlace {
   mutable std::size_t m_unwound = 0;         // the serial of the target that it waits for
 };
 
-inline Calculation::Calculation(GraphState& state, DGNode const* node)
-    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
-  if (node) node->m_isCalculating = true;
-}
-inline Calculation::~Calculation() {
-  if (m_node) m_node->m_isCalculating = false;
-  m_state.m_calculation = m_outer;
-}
-
 // The node of a `$dep` field.
 class DGDepNode : public DGNode {
  public:

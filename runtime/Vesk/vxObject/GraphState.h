@@ -186,7 +186,10 @@ struct GraphState : PerThread<GraphState> {
   // Whether what is read next must be calculated further out. Not what the outermost calculation reads: that is
   // there.
   bool IsDeep() const;
-  void MeasureStack(std::uintptr_t most);
+  void MeasureStack(std::uintptr_t most) {
+    m_stack = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
+    m_mostStack = most;
+  }
 
   void OnDestroy(DGNode const* node);
   // The calculation that runs goes on without something that it wanted to read: its value is not to be kept.

@@ -4,7 +4,6 @@
 @import "Vesk/vxObject/Graph.h"
 
 #include <algorithm>
-#include <iterator>
 
 namespace vesk {
 
@@ -18,11 +17,6 @@ GraphState::~GraphState() {}
 void GraphState::Begin() {
   m_isEvaluating = true;
   MeasureStack(MostCalculationStack);
-}
-
-inline void GraphState::MeasureStack(std::uintptr_t most) {
-  m_stack = reinterpret_cast<std::uintptr_t>(__builtin_frame_address(0));
-  m_mostStack = most;
 }
 
 void GraphState::Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
@@ -339,30 +333,6 @@ void DGNode::Calculate(GraphState& state) const {
   CalculateHere(state);
 }
 
-// On the next stack; where all are used up, or there is none, further out.
-void DGNode::CalculateElsewhere(GraphState& state) const {
-  CalculationStack* const end = std::end(state.m_otherStacks);
-  CalculationStack* const next =
-      std::find_if(std::begin(state.m_otherStacks), end, [](CalculationStack& stack) { return stack.Open(); });
-  if (next == end) {
-    state.m_deep = this;
-    throw DeepRead();
-  }
-  struct Stack {
-    ~Stack() {
-      m_state.m_stack = m_stack;
-      m_state.m_mostStack = m_most;
-    }
-    GraphState& m_state;
-    std::uintptr_t m_stack = m_state.m_stack, m_most = m_state.m_mostStack;
-  } stack{state};
-  const auto calculate = [&] {
-    state.MeasureStack(next->Usable());
-    CalculateHere(state);
-  };
-  next->Run(calculate);
-}
-
 void DGNode::CalculateHere(GraphState& state) const {
   try {
     Recalculate(state);
@@ -398,6 +368,15 @@ inline void DGNode::Recalculate(GraphState& state) const {
   Changes dirty;
   for (NodeLink const& link : m_dependents) link.m_node->Mark(true, dirty);
   Spread(state, dirty);
+}
+
+Calculation::Calculation(GraphState& state, DGNode const* node)
+    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
+  if (node) node->m_isCalculating = true;
+}
+Calculation::~Calculation() {
+  if (m_node) m_node->m_isCalculating = false;
+  m_state.m_calculation = m_outer;
 }
 
 void Calculation::Forget(DGNode const* node, DGNode const* input) {

@@ -1,8 +1,10 @@
 // Going on on another stack, and back. Sanitizers are told of it.
 
-@import "Vesk/vxObject/CalculationStack.h"
+@import "Vesk/vxObject/Graph.h"
 
+#include <algorithm>
 #include <exception>
+#include <iterator>
 
 #if defined(__GLIBC__)
 #include <sys/mman.h>
@@ -141,5 +143,29 @@ void CalculationStack::RunOn(void (*action)(void*), void* of) {
 }
 
 #endif
+
+// On the next stack; where all are used up, or there is none, further out.
+void DGNode::CalculateElsewhere(GraphState& state) const {
+  CalculationStack* const end = std::end(state.m_otherStacks);
+  CalculationStack* const next =
+      std::find_if(std::begin(state.m_otherStacks), end, [](CalculationStack& stack) { return stack.Open(); });
+  if (next == end) {
+    state.m_deep = this;
+    throw DeepRead();
+  }
+  struct Stack {
+    ~Stack() {
+      m_state.m_stack = m_stack;
+      m_state.m_mostStack = m_most;
+    }
+    GraphState& m_state;
+    std::uintptr_t m_stack = m_state.m_stack, m_most = m_state.m_mostStack;
+  } stack{state};
+  const auto calculate = [&] {
+    state.MeasureStack(next->Usable());
+    CalculateHere(state);
+  };
+  next->Run(calculate);
+}
 
 }  // namespace vesk
