@@ -1,4 +1,4 @@
-// Starting a tool through the command interpreter, and what is said of how it ended.
+// Starting a tool, through the command interpreter or by its words, and what is said of how it ended.
 #pragma once
 
 #include <optional>
@@ -13,6 +13,7 @@ namespace qrex {
 
 struct Command {
   std::string line;
+  std::vector<std::string> words = {};  // run without the interpreter; the line is what is told of them
   bool echo = false;
   bool capturesOutput = false;
   bool capturesErrors = false;

@@ -34,7 +34,7 @@ struct MessageInLine {
 
 class OutputScanner {
  public:
-  explicit OutputScanner(const BuildFiles& builder) : m_builder(builder) {
+  OutputScanner(const BuildFiles& builder, std::string_view launcher) : m_builder(builder), m_launcher(launcher) {
     FullPathOf(".", m_currentDirectory);
     if (!m_currentDirectory.ends_with('/')) m_currentDirectory += '/';
   }
@@ -52,7 +52,7 @@ class OutputScanner {
  private:
   void ScanLine(std::string_view line) {
     const size_t begin = line.find_first_not_of(" \t\v\f\r");
-    if (begin == std::string_view::npos) return;
+    if (begin == std::string_view::npos || IsOfLauncher(line.substr(begin))) return;
     for (size_t at = begin; at < line.size() && StandsInFileName(line[at]);) {
       MessageInLine message;
       if (ReadMessage(line, begin, at, message)) {
@@ -63,6 +63,14 @@ class OutputScanner {
         ++at;
       }
     }
+  }
+
+  // Launchers name themselves, at times with a process number: "distcc[17] ...", "ccache: ...".
+  bool IsOfLauncher(std::string_view line) const {
+    if (m_launcher.empty() || !StartsWithIgnoringCase(line, m_launcher) || line.size() == m_launcher.size())
+      return false;
+    const char behind = line[m_launcher.size()];
+    return behind == '[' || behind == ':';
   }
 
   // Is the number of a message behind the `(` or `:` at `at`?
@@ -128,6 +136,7 @@ class OutputScanner {
   }
 
   const BuildFiles& m_builder;
+  const std::string_view m_launcher;
   std::string m_currentDirectory;  // with a slash at the end
   TraceWriter m_trace;
   ToolMessages m_found;
@@ -135,8 +144,8 @@ class OutputScanner {
 
 }  // namespace
 
-ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text) {
-  return OutputScanner(builder).Scan(text);
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text, std::string_view launcher) {
+  return OutputScanner(builder, launcher).Scan(text);
 }
 
 }  // namespace qrex

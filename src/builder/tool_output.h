@@ -13,7 +13,7 @@ struct ToolMessages {
 };
 
 // Echoes the text. Two forms are recognised: `file(line) : error ...` and, of the gcc family, `file:line:column: error:
-// ...`.
-ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text);
+// ...`. What a launcher of that name says of itself is no message of a tool.
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text, std::string_view launcher = {});
 
 }  // namespace qrex

@@ -46,6 +46,8 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
+    {"commandFiles", &ConfigSettings::commandFiles,
+     "false: compilers are given command lines, for launchers that read no response files"},
 };
 
 inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {
@@ -55,6 +57,10 @@ inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {
 inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kListKeys[] = {
     {"virtualTree", &ConfigSettings::virtualTree, "the roots under which workspaces, projects and sources are found"},
     {"workspaces", &ConfigSettings::workspaces, "workspace files and single projects, by their path below a root"},
+};
+
+inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kCommandKeys[] = {
+    {"launcher", &ConfigSettings::launcher, "a command ahead of compilers, by its words: ccache, distcc"},
 };
 
 inline constexpr ConfigKey<std::string PlatformEnvironment::*> kEnvironmentKeys[] = {

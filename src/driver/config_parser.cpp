@@ -56,6 +56,8 @@ class ConfigParser : public MpfwParser {
   void ParseVariable();
   void ParseEnvironment(std::string PlatformEnvironment::*field);
   void ParseList(std::vector<std::string>& list);
+  void ParseCommand(std::vector<std::string>& words);
+  void ReadListBody(std::vector<std::string>& list);  // behind its `{`
   void ParseNumberKey(int64_t& number);
   bool ReadAssignment();  // `=` or `+=`; true: the list starts anew
   std::string ReadWord();
@@ -116,6 +118,7 @@ void ConfigParser::ParseStatement() {
   if (current.kind == kDollar) return ParseVariable();
   if (const auto* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
   if (const auto* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
+  if (const auto* key = FindRow(kCommandKeys, current)) return ParseCommand(m_settings.*key->field);
   if (const auto* key = FindRow(kNumberKeys, current)) return ParseNumberKey(m_settings.*key->field);
   if (const auto* key = FindRow(kStringKeys, current)) {
     Advance();
@@ -220,12 +223,30 @@ void ConfigParser::ParseNumberKey(int64_t& number) {
 void ConfigParser::ParseList(std::vector<std::string>& list) {
   Advance();
   if (ReadAssignment()) list.clear();
+  ReadListBody(list);
+}
+
+void ConfigParser::ReadListBody(std::vector<std::string>& list) {
   while (current.kind != kCloseBrace) {
     std::string entry;
     ReadName(entry);
     list.push_back(std::move(entry));
   }
   Advance();
+}
+
+// A list of words, or one word; an empty one is no command.
+void ConfigParser::ParseCommand(std::vector<std::string>& words) {
+  Advance();
+  Expect(kAssign, "=");
+  words.clear();
+  if (current.kind == kOpenBrace) {
+    Advance();
+    return ReadListBody(words);
+  }
+  std::string word;
+  ReadName(word);
+  if (!word.empty()) words.push_back(std::move(word));
 }
 
 }  // namespace

@@ -8,6 +8,7 @@
 #include <array>
 #include <cerrno>
 #include <csignal>
+#include <cstring>
 
 #include "platform/console.h"
 #include "platform/interpreter.h"
@@ -177,6 +178,20 @@ class Processes::Running {
     return false;
   }
 };
+
+bool FitsCommandLine(const std::vector<std::string>& words) {
+  constexpr size_t kLongestWord = 32 * 4096 - 1;  // of Linux: MAX_ARG_STRLEN
+  constexpr size_t kRoom = 64 * 1024;
+  const long limit = sysconf(_SC_ARG_MAX);
+  size_t size = kRoom;
+  const auto add = [&](size_t length) { size += length + 1 + sizeof(char*); };
+  for (const std::string& word : words) {
+    if (word.size() > kLongestWord) return false;
+    add(word.size());
+  }
+  for (char** variable = environ; *variable; ++variable) add(std::strlen(*variable));
+  return limit < 0 || size <= static_cast<size_t>(limit);
+}
 
 Processes::Processes() = default;
 Processes::~Processes() = default;

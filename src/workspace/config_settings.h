@@ -53,7 +53,9 @@ struct ConfigSettings {
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
   bool compilableText = false;
-  int64_t jobs = 1;  // tools at once; 0: as many as there are processors
+  int64_t jobs = 1;                   // tools at once; 0: as many as there are processors
+  std::vector<std::string> launcher;  // words ahead of compilers
+  bool commandFiles = true;  // compilers are given response files; false: command lines, where they are not too long
   bool failOnErrors = false;
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
@@ -66,6 +68,7 @@ struct ConfigSettings {
   std::unique_ptr<platform::JobServer> jobServer;  // of the make that runs this program; null: none
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
+  bool hasToldOfLongCommand = false;
 
   void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
