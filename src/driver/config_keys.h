@@ -47,7 +47,7 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
     {"commandFiles", &ConfigSettings::commandFiles,
-     "false: compilers are given command lines, for launchers that read no response files"},
+     "compilers read their options in response files, else on command lines"},
 };
 
 inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {
