@@ -16,19 +16,26 @@
 
 namespace qrex {
 
-// Compilers that write into one file of debug information, or read a precompiled header that another source makes, run
-// one after the other.
-size_t ProjectBuilder::SlotCount(const ConfigSettings& settings) {
-  if (!IsGccFamily(settings.compiler)) return 1;
-  return settings.jobs == 0 ? platform::ProcessorCount() : static_cast<size_t>(settings.jobs);
-}
-
 void ProjectBuilder::WriteHeading(std::string_view end) const {
   TraceWriter() << "\n------------------------------------- " << project.name << "  [" << config.name << "|"
                 << config.platform << "] ------------------------------------------" << end;
 }
 
 bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile* singleFile) {
+  bool hasSucceeded = false;
+  Begin(dependencyFile, singleFile, [&](bool succeeded) { hasSucceeded = succeeded; });
+  try {
+    scheduler.WaitForAll();
+  } catch (const IException&) {
+    Save();
+    throw;
+  }
+  return hasSucceeded;
+}
+
+void ProjectBuilder::Begin(const std::string& dependencyFile, const ProjectFile* singleFile,
+                           std::function<void(bool)> whenOver) {
+  m_dependencyFile = dependencyFile;
   if (!settings.translateOnly && settings.Environment()) ApplyEnvironment(*settings.Environment());
   // What these print is searched for words.
   if (RunsTools() && IsGccFamily(settings.compiler)) platform::SetEnvironment("LC_ALL", "C");
@@ -37,12 +44,11 @@ bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile*
   PrepareFiles(dependencyFile);
   try {
     RunSteps(singleFile);
+    AddLastStep(std::move(whenOver));
   } catch (const IException&) {
-    Save(dependencyFile);
+    Save();
     throw;
   }
-  Save(dependencyFile);
-  return !m_hasFailed;
 }
 
 void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
@@ -52,12 +58,20 @@ void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
     scheduler.WaitForAll();  // what was begun ahead of the error is finished
     throw;
   }
-  scheduler.WaitForAll();
-  if (!project.exported && settings.mode == RunMode::Build) {
+}
+
+void ProjectBuilder::AddLastStep(std::function<void(bool)> whenOver) {
+  auto link = [this]() -> std::unique_ptr<BuildStep> {
+    if (project.exported || settings.mode != RunMode::Build) return nullptr;
     ReportUnregistered();
-    if (!settings.translateOnly && !m_hasFailed) LinkIfStale();
-  }
-  scheduler.WaitForAll();
+    return settings.translateOnly || m_hasFailed ? nullptr : LinkIfStale();
+  };
+  scheduler.AddBehind(link, [this, whenOver = std::move(whenOver)](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    if (succeeded && !m_linked.empty()) settings.made.insert(m_linked);
+    Save();
+    whenOver(!m_hasFailed);
+  });
 }
 
 void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
@@ -181,8 +195,8 @@ void ProjectBuilder::ReportUnregistered() const {
   }
 }
 
-void ProjectBuilder::LinkIfStale() {
-  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return;  // no target
+std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
+  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
@@ -197,22 +211,20 @@ void ProjectBuilder::LinkIfStale() {
     return time > targetTime || (time == targetTime && settings.made.contains(input));
   };
   const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), isLater);
-  if (isCurrent && !LiesAhead(*this, targetTime)) return;
-  scheduler.Add(TargetStep(*this, target, inputs), [this, target](bool succeeded) {
-    m_hasFailed = m_hasFailed || !succeeded;
-    if (succeeded) settings.made.insert(target);
-  });
+  if (isCurrent && !LiesAhead(*this, targetTime)) return nullptr;
+  m_linked = target;
+  return TargetStep(*this, target, inputs);
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
-void ProjectBuilder::Save(const std::string& dependencyFile) {
+void ProjectBuilder::Save() {
   if (registerMap.dirty || unregisterMap.dirty) {
     for (ScannedFile* file : scanned) {
       if (file->file.isMainSource && (!file->HasBegun() || file->needsWriting)) file->times.translation = 0;
     }
   }
   if (m_hasStaleFiles) ForgetUnsettledTails(*this);
-  SaveDependencyFile(*this, dependencyFile);
+  SaveDependencyFile(*this, m_dependencyFile);
 }
 
 void ProjectBuilder::Clean(const std::string& dependencyFile) {

@@ -14,11 +14,16 @@ namespace qrex {
 
 class ProjectBuilder : public BuildFiles {
  public:
-  using BuildFiles::BuildFiles;
+  ProjectBuilder(ConfigSettings& givenSettings, Project& givenProject, ProjectConfig& givenConfig,
+                 Scheduler& givenScheduler)
+      : BuildFiles(givenSettings, givenProject, givenConfig), scheduler(givenScheduler) {}
 
-  // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
-  // An exception of the translation goes on to the caller; what was finished before it is kept.
-  bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
+  // Translates, and has the scheduler compile and link. `whenOver` is told, behind all steps, whether they succeeded;
+  // until then the builder must live. With a single file only that file is compiled, and resources and the link are
+  // left out. An exception of the translation goes on to the caller; what was finished before it is kept.
+  void Begin(const std::string& dependencyFile, const ProjectFile* singleFile, std::function<void(bool)> whenOver);
+  bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);  // to the end
+  void Save();  // the dependency file; for a builder that comes to no end, what is known so far
   // Behind a Build: translates again what follows from these files, whose texts have changed since, and no other. What
   // they and all that import them had declared is taken back. A pass that ends early, by an exception, is made good by
   // the next one.
@@ -26,7 +31,7 @@ class ProjectBuilder : public BuildFiles {
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   int64_t errorCount = 0;
-  Scheduler scheduler{settings.tools, SlotCount(settings), settings.jobServer.get()};
+  Scheduler& scheduler;
 
  private:
   struct Object {
@@ -34,9 +39,9 @@ class ProjectBuilder : public BuildFiles {
     const ProjectFile* source = nullptr;
   };
 
-  static size_t SlotCount(const ConfigSettings& settings);
   void WriteHeading(std::string_view end) const;
   void RunSteps(const ProjectFile* singleFile);
+  void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
@@ -49,9 +54,10 @@ class ProjectBuilder : public BuildFiles {
   void CompileIfStale(ScannedFile& file);
   void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
-  void LinkIfStale();
-  void Save(const std::string& dependencyFile);
+  std::unique_ptr<BuildStep> LinkIfStale();
 
+  std::string m_dependencyFile;
+  std::string m_linked;                               // the target, while it is
   std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
   bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
   bool m_hasFailed = false;                           // a step has

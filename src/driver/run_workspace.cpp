@@ -6,7 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
-#include "builder/tools.h"
+#include "driver/project_queue.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"
@@ -55,8 +55,7 @@ class WorkspaceRun {
   ConfigSettings& m_settings;
   Workspace m_workspace;
   Generator m_generator{m_settings.leftovers};
-  int64_t m_errors = 0;
-  int64_t m_warnings = 0;
+  ProjectQueue m_queue{m_settings};
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
 };
 
@@ -160,17 +159,19 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     for (size_t i = 0; i < m_workspace.projects.size(); ++i) {
       Project& project = *m_workspace.projects[i];
       if (IsLeftAlone(project) || ProcessProject(project)) continue;
+      m_queue.Finish();
       ReportLeftOut(i + 1);
       return false;
     }
+    if (!m_queue.Finish()) return false;
   }
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
-  if (m_warnings > 0 || m_errors > 0) {
-    timer.Label() << " with " << m_warnings << " warnings, " << m_errors << " errors";
+  if (m_queue.Warnings() > 0 || m_queue.Errors() > 0) {
+    timer.Label() << " with " << m_queue.Warnings() << " warnings, " << m_queue.Errors() << " errors";
   }
-  return m_errors == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
+  return m_queue.Errors() == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
 }
 
 // After an error that ends the run.
@@ -195,12 +196,11 @@ bool WorkspaceRun::ProcessProject(Project& project) {
     if (m_settings.mode == RunMode::Build) Repackage(project);
   }
   const bool isTranslated = project.usesQrex && (!project.exported || IsLibrary(project.targetType));
-  if (isTranslated && !BuildProject(project)) return false;
-  if (!project.exported && m_settings.exportPublicHeaders && m_settings.mode == RunMode::Build) {
-    ProjectConfig* config = FindProjectConfig(project);
-    if (!config) return false;
-    ExportPublicHeaders(project, *config);
-  }
+  if (isTranslated) return BuildProject(project);
+  if (!m_queue.ExportsHeaders(project)) return true;
+  ProjectConfig* config = FindProjectConfig(project);
+  if (!config) return false;
+  ExportPublicHeaders(project, *config);
   return true;
 }
 
@@ -289,45 +289,10 @@ ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
   return config;
 }
 
-// What ends a build early is reported here, and ends the run.
-template <typename Work>
-bool Guarded(const ConfigSettings& settings, Work work) {
-  try {
-    work();
-    return true;
-  } catch (const LexScannerException& exception) {
-    settings.Tell(Message(Severity::Error, "error : ", exception.message)
-                      .At({exception.file, exception.line, exception.begin, exception.end})
-                      .WithHint(exception.hint)
-                      .Apart());
-  } catch (const IException& exception) {
-    settings.Tell(Message(Severity::Error, "Error: ", ExceptionText(exception)));
-  }
-  return false;
-}
-
 bool WorkspaceRun::BuildProject(Project& project) {
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
-  return Guarded(m_settings, [&] {
-    ProjectBuilder builder(m_settings, project, *config);
-    ScopeTimer timer;
-    const std::string dependencyFile = DependencyFilePath(project, *config);
-    bool succeeded = true;
-    if (m_settings.mode == RunMode::Clean) {
-      builder.Clean(dependencyFile);
-      succeeded = builder.errorCount == 0;
-    } else {
-      succeeded = builder.Build(dependencyFile, nullptr);
-      TellCopiedSources(project);
-    }
-    m_errors += builder.errorCount;
-    m_warnings += builder.warningCount;
-    if (succeeded) {
-      timer.Stop();
-      timer.Label() << project.name;
-    }
-  });
+  return m_settings.mode == RunMode::Clean ? m_queue.Clean(project, *config) : m_queue.Build(project, *config);
 }
 
 void WorkspaceRun::GenerateWorkspace() {
@@ -369,9 +334,8 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   }
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
-  ProjectBuilder builder(m_settings, project, *config);
-  DeleteReporting(builder.paths.Translated(*file));
-  if (!Guarded(m_settings, [&] { builder.Build(DependencyFilePath(project, *config), file); })) return false;
+  DeleteReporting(BuildPaths(project, *config).Translated(*file));
+  if (!m_queue.Compile(project, *config, *file)) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Compile completed";
