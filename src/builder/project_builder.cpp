@@ -63,12 +63,15 @@ void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
 void ProjectBuilder::AddLastStep(std::function<void(bool)> whenOver) {
   auto link = [this]() -> std::unique_ptr<BuildStep> {
     if (project.exported || settings.mode != RunMode::Build) return nullptr;
-    ReportUnregistered();
-    return settings.translateOnly || m_hasFailed ? nullptr : LinkIfStale();
+    if (!m_hasFaultyFiles) ReportUnregistered();
+    if (settings.translateOnly || m_hasFailed) return nullptr;
+    if (const Project* const library = UnmadeLibrary()) return ReportUnlinked(*library);
+    return LinkIfStale();
   };
   scheduler.AddBehind(link, [this, whenOver = std::move(whenOver)](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
     if (succeeded && !m_linked.empty()) settings.made.insert(m_linked);
+    if (m_hasFailed) settings.unmade.insert(&project);
     Save();
     whenOver(!m_hasFailed);
   });
@@ -125,7 +128,7 @@ void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
     if (TailsMoved(file)) WriteAgain(file);
   }
-  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten)) BringUpToDate(file);
+  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten) && !Translate(file)) return;
   if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.times.translation == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
     CompileResourceIfStale(file);
@@ -134,11 +137,21 @@ void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   if (kind == FileKind::Cpp && !file.HasBegunInPass()) MarkRegistered(file);
 }
 
+bool ProjectBuilder::Translate(ScannedFile& file) {
+  try {
+    BringUpToDate(file);
+    return true;
+  } catch (const FaultyFileException&) {
+    m_hasFailed = m_hasFaultyFiles = true;
+    return false;
+  }
+}
+
 // What no run has translated registers something or not: the main source, which is to be compiled alone, has to know.
 // The file stays stale.
 void ProjectBuilder::LearnNames(ScannedFile& file) {
   const bool needsWriting = std::exchange(file.needsWriting, false);
-  BringUpToDate(file);
+  Translate(file);
   file.needsWriting = needsWriting;
 }
 
@@ -156,7 +169,7 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
   if (isNew) object.time = times.LastWriteTime(path);
   if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
-  BringUpToDate(file);
+  if (!Translate(file)) return;
   scheduler.Add(ObjectStep(*this, file), [this, path, &object](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
     object.time = times.LastWriteTime(path);
@@ -193,6 +206,32 @@ void ProjectBuilder::ReportUnregistered() const {
                       .At({file->SourcePath(), 1})
                       .WithHint(HowToRegister(*file)));
   }
+}
+
+// In a run that keeps going: the first of those that the target is linked with which could not be made. A static
+// library leaves them to its users.
+const Project* ProjectBuilder::UnmadeLibrary() const {
+  if (!settings.keepGoing || settings.unmade.empty() || project.targetType == TargetType::StaticLibrary) return nullptr;
+  std::vector<const Project*> open{&project};
+  std::unordered_set<const Project*> seen{&project};
+  while (!open.empty()) {
+    const Project* const user = open.back();
+    open.pop_back();
+    for (const std::string& path : user->subprojects) {
+      const Project* const used = project.workspace->FindSubproject(path);
+      if (!used || !IsLibrary(used->targetType) || !seen.insert(used).second) continue;
+      if (settings.unmade.contains(used)) return used;
+      if (used->targetType == TargetType::StaticLibrary) open.push_back(used);
+    }
+  }
+  return nullptr;
+}
+
+// The error is that of the library.
+std::unique_ptr<BuildStep> ProjectBuilder::ReportUnlinked(const Project& library) {
+  TraceWriter() << project.name << " is not linked: " << library.name << " could not be made\n";
+  m_hasFailed = true;
+  return nullptr;
 }
 
 std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {

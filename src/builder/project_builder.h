@@ -30,7 +30,6 @@ class ProjectBuilder : public BuildFiles {
   void TranslateAgain(const std::vector<ProjectFile*>& changed);
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
-  int64_t errorCount = 0;
   Scheduler& scheduler;
 
  private:
@@ -45,6 +44,8 @@ class ProjectBuilder : public BuildFiles {
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
+  bool Translate(ScannedFile& file);  // false: it failed, and the run goes on
+  const Project* UnmadeLibrary() const;
   void ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
   void BeginPass(const std::vector<ProjectFile*>& changed);
   bool RegistriesMoved();              // asked for the main source, behind all that could settle them
@@ -55,12 +56,14 @@ class ProjectBuilder : public BuildFiles {
   void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
   std::unique_ptr<BuildStep> LinkIfStale();
+  std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 
   std::string m_dependencyFile;
   std::string m_linked;                               // the target, while it is
   std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
   bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
   bool m_hasFailed = false;                           // a step has
+  bool m_hasFaultyFiles = false;
 };
 
 // Copies what is outside the project's `src` folder to the export directories, translated and as it is.

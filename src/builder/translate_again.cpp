@@ -26,7 +26,9 @@ void ProjectBuilder::BeginPass(const std::vector<ProjectFile*>& changed) {
   const std::vector<ScannedFile*> taken = TakeBack(stale, all);
   std::for_each(taken.begin(), taken.end(), write);
   Symbols().BeginPass();
+  settings.faulty.clear();
   for (ScannedFile* file : all) {
+    if (file->state == TranslationState::Failed) file->TakeBack();
     file->isKept = file->state == TranslationState::Done;
     file->place = 0;
     file->tail.isRegistered = false;

@@ -46,6 +46,7 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
+    {"keepGoing", &ConfigSettings::keepGoing, "go on behind a translation error, tell all of them, end with status 1"},
     {"commandFiles", &ConfigSettings::commandFiles,
      "compilers read their options in response files, else on command lines"},
 };

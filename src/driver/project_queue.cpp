@@ -14,15 +14,9 @@ bool ProjectQueue::Guarded(Work work) {
   try {
     work();
     return true;
-  } catch (const LexScannerException& exception) {
-    for (Begun& begun : m_begun) begun.builder.Save();
-    m_settings.Tell(Message(Severity::Error, "error : ", exception.message)
-                        .At({exception.file, exception.line, exception.begin, exception.end})
-                        .WithHint(exception.hint)
-                        .Apart());
   } catch (const IException& exception) {
     for (Begun& begun : m_begun) begun.builder.Save();
-    m_settings.Tell(Message(Severity::Error, "Error: ", ExceptionText(exception)));
+    m_settings.Tell(ErrorOf(exception));
   }
   return false;
 }
@@ -66,7 +60,7 @@ void ProjectQueue::End(Begun& begun, bool succeeded) {
 
 bool ProjectQueue::Compile(Project& project, ProjectConfig& config, const ProjectFile& file) {
   ProjectBuilder builder(m_settings, project, config, m_scheduler);
-  return Guarded([&] { builder.Build(DependencyFilePath(project, config), &file); });
+  return Guarded([&] { builder.Build(DependencyFilePath(project, config), &file); }) && m_settings.faulty.empty();
 }
 
 bool ProjectQueue::Clean(Project& project, ProjectConfig& config) {

@@ -171,6 +171,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   if (m_queue.Warnings() > 0 || m_queue.Errors() > 0) {
     timer.Label() << " with " << m_queue.Warnings() << " warnings, " << m_queue.Errors() << " errors";
   }
+  if (!m_settings.faulty.empty()) return false;
   return m_queue.Errors() == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
 }
 

@@ -17,6 +17,8 @@
 
 namespace qrex {
 
+class Project;
+
 enum class RunMode { Clean, Compile, Build, Gen, Show };
 enum class RuntimeChoice { None, Source, Built };
 
@@ -57,6 +59,7 @@ struct ConfigSettings {
   std::vector<std::string> launcher;  // words ahead of compilers
   bool commandFiles = true;  // compilers are given response files; false: command lines, where they are not too long
   bool failOnErrors = false;
+  bool keepGoing = false;                       // an error in a source ends its translation, and not the run
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   RunMode fileMode = RunMode::Build;  // without what the command line added
@@ -69,6 +72,8 @@ struct ConfigSettings {
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
   bool hasToldOfLongCommand = false;
+  std::unordered_set<std::string> faulty;     // sources with an error, which has been told
+  std::unordered_set<const Project*> unmade;  // whose target could not be made
 
   void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null

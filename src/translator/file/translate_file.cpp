@@ -102,10 +102,19 @@ void Begin(ScannedFile& file, Work work) {
     if (file.isKept && file.place == 0) TakePlaces(file);
     return;
   }
-  if (file.state == TranslationState::Failed) file.TakeBack();
+  const bool keepsGoing = file.host.Settings().keepGoing;
+  if (file.state == TranslationState::Failed) {
+    if (keepsGoing) throw FaultyFileException("", nullptr);
+    file.TakeBack();
+  }
   file.state = TranslationState::Running;
   try {
     work(file);
+  } catch (const IException& exception) {
+    file.state = TranslationState::Failed;
+    if (!keepsGoing) throw;
+    file.host.TellFault(file, exception);
+    throw FaultyFileException("", nullptr);
   } catch (...) {
     file.state = TranslationState::Failed;
     throw;
