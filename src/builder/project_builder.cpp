@@ -128,6 +128,9 @@ void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
     if (TailsMoved(file)) WriteAgain(file);
   }
+  if (file.file.isMainSource && m_hasFaultyFiles && file.needsWriting && isWritten) {
+    return LearnNames(file);  // it would lack what those register
+  }
   if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten) && !Translate(file)) return;
   if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.times.translation == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {

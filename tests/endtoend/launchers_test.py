@@ -148,6 +148,11 @@ def test_the_missing_one_is_named(workspace):
         log = workspace.run("all.qrex", f'launcher = {{ "{launcher}" }}', f'PATH("x64") = {{ "tools" "{path}" }}')
         equal(log.count(message), COUNT)
         holds(log, f"0 warnings, {COUNT} errors")
+    # One that dies leaves nothing that passes for an object.
+    workspace.write("tools/pass", '#!/bin/sh\nwhile [ "$1" != -o ]; do shift; done\necho half > "$2"\nkill -9 $$\n')
+    clean(workspace)
+    holds(workspace.run("all.qrex", 'launcher = "pass"', "commandFiles=false"), "ERROR: pass was ended by signal 9", f"{COUNT} errors")
+    equal(workspace.times("x64/**/*.o"), {})
     # The linker has none.
     workspace.write("tools/pass", '#!/bin/sh\ncase "$*" in *-c*) exec "$@";; esac\nexit 3\n')
     build(workspace, '"pass"')

@@ -49,6 +49,7 @@ def gcc():
         "tree/app/src/app.qrpj": program.replace("@dirname", "app"),
         "tree/app/src/app.cpp": '@import "zoo/zoo.h"\n$init { }\nint main() { return legs; }\n',
         "tree/app/src/more.cpp": "int more;\n",
+        "tools/lead": '#!/bin/sh\n"$@"\n',
         "tools/gcc-4": COMPILER,
         "tools/ar": LIBRARIAN,
         "tools/g++": LINKER,
