@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "builder/build_observer.h"
 #include "translator/file/translate_file.h"
 
 namespace qrex {
@@ -79,6 +80,14 @@ void BuildFiles::TellFault(const ScannedFile& file, const IException& exception)
     ++errorCount;
   }
   settings.Tell(message);
+}
+
+void BuildFiles::TranslationBegins(const ScannedFile& file) {
+  if (settings.observer) settings.observer->TranslationBegins(file);
+}
+
+void BuildFiles::TranslationEnds(const ScannedFile& file) {
+  if (settings.observer) settings.observer->TranslationEnds(file);
 }
 
 void BuildFiles::TakenBack(ScannedFile& file) {

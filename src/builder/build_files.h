@@ -40,6 +40,8 @@ class BuildFiles : public TranslationHost {
   void Tell(const Message& message) override;
   void TellFault(const ScannedFile& file, const IException& exception) override;
   void TakenBack(ScannedFile& file) override;
+  void TranslationBegins(const ScannedFile& file) override;
+  void TranslationEnds(const ScannedFile& file) override;
   bool FindSourcePlace(const char* position, SourcePlace& place) const override;
 
   ConfigSettings& settings;

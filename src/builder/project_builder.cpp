@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "builder/dependency_file.h"
+#include "builder/make_reason.h"
 #include "builder/reflection_tails.h"
 #include "builder/staleness.h"
 #include "builder/tools.h"
@@ -42,6 +43,7 @@ void ProjectBuilder::Begin(const std::string& dependencyFile, const ProjectFile*
   WriteHeading("\n");
   if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
   PrepareFiles(dependencyFile);
+  if (settings.observer) settings.observer->ProjectBegins(project.name, ExpectedSteps());
   try {
     RunSteps(singleFile);
     AddLastStep(std::move(whenOver));
@@ -92,6 +94,7 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
     file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
+    if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
   if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, knownFiles);
@@ -119,14 +122,28 @@ void ProjectBuilder::ReadTimes() {
   for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
 }
 
+// A little more or less comes of what is met on the way.
+size_t ProjectBuilder::ExpectedSteps() const {
+  size_t count = 0;
+  for (const ScannedFile* file : scanned) {
+    bool isMade = file->needsWriting;
+    if (RunsTools() && HasObject(file->file) && !isMade) {
+      const auto object = m_objects.find(paths.Object(file->file));
+      isMade = object == m_objects.end() || object->second.time <= file->times.target;
+    }
+    if (isMade && (!RunsTools() || HasObject(file->file))) ++count;
+  }
+  return count > 0 && RunsTools() && settings.mode == RunMode::Build ? count + 1 : count;
+}
+
 void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
   const FileKind kind = file.file.kind;
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
-  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file);
+  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file, MakeReason::Cause::OthersRegister);
   if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
-    if (TailsMoved(file)) WriteAgain(file);
+    if (TailsMoved(file)) WriteAgain(file, MakeReason::Cause::RecordsMove);
   }
   if (file.file.isMainSource && m_hasFaultyFiles && file.needsWriting && isWritten) {
     return LearnNames(file);  // it would lack what those register
@@ -172,6 +189,7 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
   if (isNew) object.time = times.LastWriteTime(path);
   if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
+  if (settings.observer) settings.observer->IsStale(path, WhyCompiled(*this, file, object.time));
   if (!Translate(file)) return;
   scheduler.Add(ObjectStep(*this, file), [this, path, &object](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
@@ -252,8 +270,14 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
     const int64_t time = timeOf(input);
     return time > targetTime || (time == targetTime && settings.made.contains(input));
   };
-  const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), isLater);
-  if (isCurrent && !LiesAhead(*this, targetTime)) return nullptr;
+  const auto later = targetTime == 0 ? watched.end() : std::find_if(watched.begin(), watched.end(), isLater);
+  if (targetTime != 0 && later == watched.end() && !LiesAhead(*this, targetTime)) return nullptr;
+  if (settings.observer) {
+    using Cause = MakeReason::Cause;
+    const Cause cause = targetTime == 0 ? Cause::Missing : later == watched.end() ? Cause::Ahead : Cause::Changed;
+    settings.observer->IsStale(
+        target, {cause, cause == Cause::Changed ? *later : "", cause == Cause::Changed ? timeOf(*later) : 0});
+  }
   m_linked = target;
   return TargetStep(*this, target, inputs);
 }
@@ -267,6 +291,7 @@ void ProjectBuilder::Save() {
   }
   if (m_hasStaleFiles) ForgetUnsettledTails(*this);
   SaveDependencyFile(*this, m_dependencyFile);
+  if (settings.observer) settings.observer->ProjectEnds(*this);
 }
 
 void ProjectBuilder::Clean(const std::string& dependencyFile) {

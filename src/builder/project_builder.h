@@ -43,13 +43,14 @@ class ProjectBuilder : public BuildFiles {
   void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
+  size_t ExpectedSteps() const;
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   bool Translate(ScannedFile& file);  // false: it failed, and the run goes on
   const Project* UnmadeLibrary() const;
   void ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
   void BeginPass(const std::vector<ProjectFile*>& changed);
-  bool RegistriesMoved();              // asked for the main source, behind all that could settle them
-  void WriteAgain(ScannedFile& file);  // though it was translated in an earlier pass
+  bool RegistriesMoved();  // asked for the main source, behind all that could settle them
+  void WriteAgain(ScannedFile& file, MakeReason::Cause why);  // though it was translated in an earlier pass
   void LearnNames(ScannedFile& file);
   void CompileResourceIfStale(ScannedFile& file);
   void CompileIfStale(ScannedFile& file);

@@ -83,11 +83,12 @@ platform::Processes::Id StartCommand(platform::Processes& tools, const Command& 
   if (command.capturesOutput) DeleteThoughReadOnly(kOutputFile);
   if (command.capturesErrors) DeleteThoughReadOnly(kErrorFile);
   if (command.echo) TraceWriter() << LineOf(command) << "\n";
+  const bool isShownBehind = command.showsOutputBehind;
   return tools.Start({.words = command.words,
                       .line = command.line,
-                      .output = command.capturesOutput ? Stream::Captured : Stream::Inherited,
+                      .output = command.capturesOutput || isShownBehind ? Stream::Captured : Stream::Inherited,
                       .errors = command.capturesErrors ? Stream::Captured : Stream::Inherited,
-                      .errorsIntoOutput = command.errorsIntoOutput});
+                      .errorsIntoOutput = command.errorsIntoOutput || isShownBehind});
 }
 
 CommandResult EndCommand(const Command& command, platform::Processes::Ended ended) {
@@ -99,6 +100,7 @@ CommandResult EndCommand(const Command& command, platform::Processes::Ended ende
     return result;
   };
 
+  if (std::string shown; command.showsOutputBehind && TakeCaptured(ended.output, shown)) TraceWriter() << shown;
   if (ended.end.cause == platform::ProcessEnd::Cause::NotStarted) {
     fail("");
     ReportNoInterpreter(ended.end.failure);

@@ -17,7 +17,8 @@ struct Command {
   bool echo = false;
   bool capturesOutput = false;
   bool capturesErrors = false;
-  bool errorsIntoOutput = false;  // the error stream joins the captured output
+  bool errorsIntoOutput = false;   // the error stream joins the captured output
+  bool showsOutputBehind = false;  // what is not captured is printed once the tool has ended
   bool failOnNonZero = false;
   bool failOnErrorText = false;
 };

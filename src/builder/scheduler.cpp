@@ -20,7 +20,10 @@ size_t SlotCount(const ConfigSettings& settings) {
 }  // namespace
 
 Scheduler::Scheduler(const ConfigSettings& settings)
-    : m_tools(settings.tools), m_slots(SlotCount(settings)), m_jobServer(settings.jobServer.get()) {}
+    : m_tools(settings.tools),
+      m_slots(SlotCount(settings)),
+      m_jobServer(settings.jobServer.get()),
+      m_observer(settings.observer) {}
 
 void Scheduler::Add(std::unique_ptr<BuildStep> step, std::function<void(bool)> whenOver) {
   while (!m_begun.empty() && WaitForOne(0)) {  // what has ended meanwhile is told at once, an interrupt most of all
@@ -54,7 +57,7 @@ void Scheduler::WaitForAll() {
 void Scheduler::Abandon() {
   if (m_begun.empty()) return;
   m_tools.EndAll();
-  while (m_tools.WaitForAny(0)) {
+  while (WaitForTool(0)) {
   }
   m_begun.clear();
   HoldTraceBehind();
@@ -87,7 +90,22 @@ void Scheduler::RunNext(Begun& begun) {
   begun.ended.reset();
   if (!command) return;
   begun.command = std::move(*command);
+  begun.command.showsOutputBehind = m_observer && m_observer->HoldsTerminal() && !begun.command.capturesOutput;
   begun.id = StartCommand(m_tools, begun.command);
+  if (m_observer) m_observer->ToolBegins(begun.id, begun.step->Task());
+}
+
+std::optional<platform::Processes::Ended> Scheduler::WaitForTool(int milliseconds) {
+  if (!m_observer) return m_tools.WaitForAny(milliseconds);
+  const bool isForever = milliseconds == platform::Processes::kForever;
+  for (;;) {
+    std::optional<platform::Processes::Ended> ended =
+        m_tools.WaitForAny(isForever ? m_observer->Patience() : milliseconds);
+    if (ended) m_observer->ToolEnds(ended->id, ended->end);
+    if (ended || m_tools.RunningCount() == 0 || milliseconds == 0) return ended;
+    m_observer->StillWaiting();
+    if (!isForever) return ended;
+  }
 }
 
 bool Scheduler::MakeStep(Begun& begun) {
@@ -103,7 +121,7 @@ bool Scheduler::MakeStep(Begun& begun) {
 }
 
 bool Scheduler::WaitForOne(int milliseconds) {
-  std::optional<platform::Processes::Ended> ended = m_tools.WaitForAny(milliseconds);
+  std::optional<platform::Processes::Ended> ended = WaitForTool(milliseconds);
   if (!ended) return false;
   const auto begun = std::find_if(m_begun.begin(), m_begun.end(),
                                   [&](const Begun& each) { return each.IsRunning() && each.id == ended->id; });
@@ -132,6 +150,7 @@ void Scheduler::FinishInOrder() {
       if (!first.isOver) break;
       const bool hasSucceeded = !first.step || first.step->HasSucceeded();
       first.step.reset();
+      if (m_observer) m_observer->StepIsOver(first.id, hasSucceeded);
       first.whenOver(hasSucceeded);
       if (!first.textBehind.empty()) WriteHeldToTrace(first.textBehind);
       m_begun.pop_front();

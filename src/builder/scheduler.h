@@ -31,12 +31,13 @@ class Scheduler {
   std::string TextOf(const std::function<void()>& work);
 
  private:
+  static constexpr platform::Processes::Id kNone = ~platform::Processes::Id{0};
   struct Begun {
     std::function<std::unique_ptr<BuildStep>()> make;  // until it is made
     std::unique_ptr<BuildStep> step;
     std::function<void(bool)> whenOver;
     Command command;
-    platform::Processes::Id id = 0;
+    platform::Processes::Id id = kNone;  // of the last command
     std::optional<platform::Processes::Ended> ended;
     bool isOver = false;
     std::string textBehind;  // of the trace log, written since it began
@@ -48,6 +49,7 @@ class Scheduler {
   void RunNext(Begun& begun);
   bool MakeStep(Begun& begun);  // false: it has to wait for a slot
   void AwaitToken();
+  std::optional<platform::Processes::Ended> WaitForTool(int milliseconds);
   bool WaitForOne(int milliseconds = platform::Processes::kForever);  // false: none has ended in that time
   void HoldTraceBehind();
   void FinishInOrder();
@@ -56,7 +58,8 @@ class Scheduler {
   platform::Processes& m_tools;
   const size_t m_slots;
   platform::JobServer* const m_jobServer;
-  std::deque<Begun> m_begun;  // in the order of their addition; the first is not over yet
+  BuildObserver* const& m_observer;  // of the settings
+  std::deque<Begun> m_begun;         // in the order of their addition; the first is not over yet
 };
 
 }  // namespace qrex

@@ -66,6 +66,14 @@ class SourceStep : public BuildStep {
                    .errorsIntoOutput = IsGcc()};  // where that family writes its messages
   }
 
+  ToolTask Task() const override {
+    return {m_file.kind == FileKind::Asm ? ToolKind::Assembler : ToolKind::Compiler,
+            m_builder.project.name,
+            m_file.path,
+            m_command.object,
+            {m_command.input}};
+  }
+
   void Finish(const CommandResult& result) override {
     if (!result.succeeded && m_response) TraceWriter() << m_responseFile << ": " << m_command.text << "\n";
     m_response.reset();
@@ -149,6 +157,10 @@ class ResourceObjectStep : public BuildStep {
       return std::nullopt;
     }
     return Command{.line = line.TakeText(), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
+  }
+
+  ToolTask Task() const override {
+    return {ToolKind::ResourceCompiler, m_builder.project.name, m_file.file.path, m_output, {m_file.SourcePath()}};
   }
 
   void Finish(const CommandResult& result) override {

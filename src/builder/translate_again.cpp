@@ -41,7 +41,8 @@ bool ProjectBuilder::RegistriesMoved() {
   return unregisterMap.IsDirty() || registers;
 }
 
-void ProjectBuilder::WriteAgain(ScannedFile& file) {
+void ProjectBuilder::WriteAgain(ScannedFile& file, MakeReason::Cause why) {
+  if (settings.observer && !file.needsWriting) settings.observer->IsStale(paths.Translated(file.file), {why});
   if (file.isKept) {
     const std::vector<ScannedFile*> files{&file};
     for (ScannedFile* taken : TakeBack(files, AllFiles(*this))) taken->needsWriting = true;

@@ -26,6 +26,7 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"platformToolset", &ConfigSettings::platformToolset,
      "the tool set in .vcxproj files: v143; projects may name theirs, too"},
     {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
+    {"buildTrace", &ConfigSettings::buildTrace, "a file for the trace of a build, as trace viewers read it"},
 };
 
 inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {

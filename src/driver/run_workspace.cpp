@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "driver/observers.h"
 #include "driver/project_queue.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
@@ -33,6 +34,7 @@ class WorkspaceRun {
   explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
   bool LoadAll();
   bool Run(ScopeTimer& timer);
+  const Workspace& Loaded() const { return m_workspace; }
 
  private:
   bool LoadWorkspaceFile(const std::string& entry);
@@ -435,7 +437,10 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   }
   const auto run = std::make_shared<WorkspaceRun>(settings);
   if (loaded) *loaded = run;
-  return run->LoadAll() && run->Run(timer);
+  RunObservers observers(settings);
+  observers.Expect(run->Loaded());
+  const bool succeeded = run->LoadAll() && run->Run(timer);
+  return observers.End() && succeeded;
 }
 
 }  // namespace qrex

@@ -18,6 +18,7 @@
 namespace qrex {
 
 class Project;
+class BuildObserver;  // builder/build_observer.h
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
 enum class RuntimeChoice { None, Source, Built };
@@ -60,6 +61,7 @@ struct ConfigSettings {
   bool commandFiles = true;  // compilers are given response files; false: command lines, where they are not too long
   bool failOnErrors = false;
   bool keepGoing = false;                       // an error in a source ends its translation, and not the run
+  std::string buildTrace;                       // the file of a trace; empty: none is written
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   RunMode fileMode = RunMode::Build;  // without what the command line added
@@ -74,6 +76,8 @@ struct ConfigSettings {
   bool hasToldOfLongCommand = false;
   std::unordered_set<std::string> faulty;     // sources with an error, which has been told
   std::unordered_set<const Project*> unmade;  // whose target could not be made
+  BuildObserver* observer = nullptr;          // of the build, not owned; null: nobody looks
+  bool coloursToolMessages = false;           // where a terminal shows them
 
   void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null

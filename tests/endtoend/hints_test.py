@@ -29,7 +29,8 @@ HERE = " (relative paths begin in the folder where Qrex runs)"
 def on_terminal(command, folder):
     """What the command writes to a terminal."""
     terminal, its_end = pty.openpty()
-    process = subprocess.Popen(command, cwd=folder, stdin=its_end, stdout=its_end, stderr=its_end)
+    process = subprocess.Popen(command, cwd=folder, stdin=its_end, stdout=its_end, stderr=its_end,
+                               env={**os.environ, "TERM": "dumb"})  # which takes no status line
     os.close(its_end)
     output = b""
     while True:

@@ -108,6 +108,7 @@ void Begin(ScannedFile& file, Work work) {
     file.TakeBack();
   }
   file.state = TranslationState::Running;
+  file.host.TranslationBegins(file);
   try {
     work(file);
   } catch (const IException& exception) {
@@ -117,9 +118,11 @@ void Begin(ScannedFile& file, Work work) {
     throw FaultyFileException("", nullptr);
   } catch (...) {
     file.state = TranslationState::Failed;
+    file.host.TranslationEnds(file);
     throw;
   }
   file.state = TranslationState::Done;
+  file.host.TranslationEnds(file);
 }
 
 }  // namespace

@@ -52,6 +52,9 @@ class TranslationHost {
   // In a run that keeps going: what ended the translation of the file.
   virtual void TellFault(const ScannedFile& file, const IException& exception) = 0;
   virtual void TakenBack(ScannedFile& file) = 0;  // ahead of it: nothing that the file holds may be kept
+  // Around the translation of a file, which has those of its imports within it.
+  virtual void TranslationBegins(const ScannedFile&) {}
+  virtual void TranslationEnds(const ScannedFile&) {}
   // In the scanned file whose source text holds the position; false when none does.
   virtual bool FindSourcePlace(const char* position, SourcePlace& place) const = 0;
 };
