@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "driver/depfile.h"
 #include "driver/project_queue.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
@@ -165,6 +166,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     }
     if (!m_queue.Finish()) return false;
   }
+  if (m_errors == 0 && !WriteDepfile(m_workspace, m_generator.Files())) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
