@@ -29,13 +29,6 @@ class PathList {
   std::vector<std::string> m_paths;
 };
 
-bool IsTranslated(const Project& project) {
-  return project.usesQrex && !project.hasFaultyFile && (!project.exported || IsLibrary(project.targetType));
-}
-
-// Of a project that comes built, headers alone are.
-bool IsTranslated(const ProjectFile& file) { return !file.project->exported || file.kind == FileKind::H; }
-
 void AddTools(const Project& project, const ProjectConfig& config, PathList& outputs) {
   const BuildPaths paths(project, config);
   for (const ProjectFile* file : project.files) {
@@ -45,6 +38,12 @@ void AddTools(const Project& project, const ProjectConfig& config, PathList& out
 }
 
 }  // namespace
+
+bool IsTranslated(const Project& project) {
+  return project.usesQrex && !project.hasFaultyFile && (!project.exported || IsLibrary(project.targetType));
+}
+
+bool IsTranslated(const ProjectFile& file) { return !file.project->exported || file.kind == FileKind::H; }
 
 std::vector<std::string> InputsOf(const Workspace& workspace) {
   PathList inputs;

@@ -4,10 +4,10 @@
 //   app.qrex:
 //   tree/app/src/app.cpp:
 //
-// (with a line for each file behind the colon). One rule, since what is stale is the tool's own business: whoever calls it need only know whether to. The file is the
-// first of its targets, and bears the time at which the run began: so a make file that includes it has it made by a
-// rule for it, and what changes during the run makes it stale. The empty rules let make go on when a file is gone.
-// Names are escaped as compilers do, whose files make and ninja read.
+// with a line for each file behind the colon. It is one rule, since what is stale is the tool's own business: whoever
+// calls it need only know whether to. The file is the first of its targets, and bears the time at which the run began:
+// so a make file that includes it has it made by a rule for it, and what changes during the run makes it stale. The
+// empty rules let make go on when a file is gone. Names are escaped as compilers do, whose files make and ninja read.
 #pragma once
 
 #include <string>
@@ -18,6 +18,9 @@
 
 namespace qrex {
 
+// Whether a build translates files of the project, and this one of such a project: of one that comes built the headers.
+bool IsTranslated(const Project& project);
+bool IsTranslated(const ProjectFile& file);
 // What the run's mode reads: configuration, workspaces, projects, what these import, and the sources of translated
 // projects. Each once, in the order of reading.
 std::vector<std::string> InputsOf(const Workspace& workspace);

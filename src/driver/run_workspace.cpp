@@ -7,6 +7,7 @@
 
 #include "builder/project_builder.h"
 #include "driver/depfile.h"
+#include "driver/listing.h"
 #include "driver/project_queue.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
@@ -34,6 +35,7 @@ class WorkspaceRun {
   explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
   bool LoadAll();
   bool Run(ScopeTimer& timer);
+  const Workspace& Loaded() const { return m_workspace; }
 
  private:
   bool LoadWorkspaceFile(const std::string& entry);
@@ -166,7 +168,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     }
     if (!m_queue.Finish()) return false;
   }
-  if (m_errors == 0 && !WriteDepfile(m_workspace, m_generator.Files())) return false;
+  if (m_queue.Errors() == 0 && !WriteDepfile(m_workspace, m_generator.Files())) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
@@ -438,6 +440,14 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   const auto run = std::make_shared<WorkspaceRun>(settings);
   if (loaded) *loaded = run;
   return run->LoadAll() && run->Run(timer);
+}
+
+bool ListWorkspace(ConfigSettings& settings, std::string& list) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings);
+  if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
+  list = ListingOf(run.Loaded());
+  return true;
 }
 
 }  // namespace qrex

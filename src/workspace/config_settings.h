@@ -64,7 +64,7 @@ struct ConfigSettings {
   bool keepGoing = false;                       // an error in a source ends its translation, and not the run
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
-  std::string depfile;  // to be written behind a run; empty: none
+  std::string depfile;                // to be written behind a run; empty: none
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   // Whoever may read the settings may write files and run tools.
