@@ -1,5 +1,20 @@
-# Translates; run by the command that qrex_translate() adds. With QREX, the program; FOLDER, in which it runs; ARGUMENTS;
-# CONFIGURATION, the files that set its keys. What it tells is shown where it is a message.
+# Translates; run by the commands that qrex_translate() adds. With QREX, the program; FOLDER, in which it runs; ARGUMENTS;
+# CONFIGURATION, the files that set its keys; COMPLETE, to do so only where a translation is gone. What it tells is shown
+# where it is a message.
+if(COMPLETE)
+  file(STRINGS "${FOLDER}/outputs.txt" outputs ENCODING UTF-8)
+  set(is_complete TRUE)
+  foreach(output IN LISTS outputs)
+    if(NOT EXISTS "${output}")
+      set(is_complete FALSE)
+    endif()
+  endforeach()
+  if(is_complete)
+    file(TOUCH "${FOLDER}/complete.stamp")
+    return()
+  endif()
+endif()
+
 file(SIZE "${QREX}" size)
 file(TIMESTAMP "${QREX}" time %s)
 set(state "${size} ${time} ${ARGUMENTS}\n")
@@ -39,3 +54,6 @@ file(WRITE "${FOLDER}/translated.d" "${target}${dependencies}")
 
 file(WRITE "${FOLDER}/state" "${state}")
 file(RENAME "${FOLDER}/begun.stamp" "${FOLDER}/translated.stamp")
+if(COMPLETE)
+  file(TOUCH "${FOLDER}/complete.stamp")
+endif()

@@ -2,8 +2,9 @@
 #
 # What is to be translated is asked of the tool while CMake configures (`Qrex --list`), and again whenever a file of
 # settings or a folder of sources changes. The translation itself is one command for a workspace and configuration,
-# whose inputs the tool tells in a dependency file: it alone knows what is stale. Its stamp is the output by which build
-# tools judge it; translated files are byproducts, so that those which a run leaves alone stay as they are.
+# whose inputs the tool tells in a dependency file: it alone knows what is stale. Its one output is a stamp, so that a
+# failure names no more. A second command, which has nothing to do but to see that all is there, has the translated files
+# as byproducts: build tools look at their times, and those that a run left alone are as old as they were.
 cmake_policy(PUSH)
 cmake_policy(VERSION 3.22)
 
@@ -21,7 +22,8 @@ function(_qrex_arguments config platform settings workspace result)
   if(platform)
     list(APPEND arguments "platform=\"${platform}\"")
   endif()
-  set(${result} "${arguments};${settings}" PARENT_SCOPE)
+  list(APPEND arguments ${settings})
+  set(${result} "${arguments}" PARENT_SCOPE)
 endfunction()
 
 function(_qrex_list folder arguments result)
@@ -91,7 +93,9 @@ function(_qrex_remove_former folder outputs)
   if(EXISTS "${folder}/outputs.txt")
     file(STRINGS "${folder}/outputs.txt" former ENCODING UTF-8)
     list(REMOVE_ITEM former ${outputs} "")
-    file(REMOVE ${former})
+    if(former)
+      file(REMOVE ${former})
+    endif()
   endif()
   string(REPLACE ";" "\n" text "${outputs}")
   file(WRITE "${folder}/outputs.txt" "${text}\n")
@@ -107,17 +111,20 @@ function(_qrex_for_config config values result)
 endfunction()
 
 # The command that translates the workspace, as a target of its own: made for the first target that asks for it.
-function(_qrex_add_command name base outputs inputs)
+function(_qrex_add_command name workspace base outputs inputs)
   set(own "${base}")
   get_property(is_multi GLOBAL PROPERTY GENERATOR_IS_MULTI_CONFIG)
   if(is_multi)
     string(APPEND own "/$<CONFIG>")
   endif()
-  add_custom_command(OUTPUT "${own}/translated.stamp" BYPRODUCTS ${outputs}
-                     COMMAND "${CMAKE_COMMAND}" -P "${own}/translate.cmake"
+  get_filename_component(file "${workspace}" NAME)
+  add_custom_command(OUTPUT "${own}/translated.stamp" COMMAND "${CMAKE_COMMAND}" -P "${own}/translate.cmake"
                      DEPENDS "${own}/translate.cmake" "${Qrex_EXECUTABLE}" ${inputs} DEPFILE "${own}/translated.d"
-                     COMMENT "Translating ${name}" VERBATIM)
-  add_custom_target(${name} DEPENDS "${own}/translated.stamp")
+                     COMMENT "Translating ${file}" VERBATIM)
+  add_custom_command(OUTPUT "${own}/complete.stamp" BYPRODUCTS ${outputs}
+                     COMMAND "${CMAKE_COMMAND}" -DCOMPLETE=TRUE -P "${own}/translate.cmake"
+                     DEPENDS "${own}/translated.stamp" COMMENT "Looking at what came of ${file}" VERBATIM)
+  add_custom_target(${name} DEPENDS "${own}/complete.stamp")
 endfunction()
 
 # A folder and a target name that no other workspace of this build has.
@@ -173,7 +180,7 @@ function(qrex_translate)
     _qrex_translate_config(${config} "${folder}")
   endforeach()
   if(NOT TARGET ${name})
-    _qrex_add_command(${name} "${base}" "${all_outputs}" "${all_inputs}")
+    _qrex_add_command(${name} "${workspace}" "${base}" "${all_outputs}" "${all_inputs}")
   endif()
   add_dependencies(${arg_TARGET} ${name})
 endfunction()
@@ -194,6 +201,7 @@ macro(_qrex_translate_config config folder)
   endif()
   _qrex_remove_former("${folder}" "${listed_outputs}")
   file(CONFIGURE OUTPUT "${folder}/translate.cmake" CONTENT [==[
+cmake_minimum_required(VERSION 3.22)
 set(QREX [[@Qrex_EXECUTABLE@]])
 set(FOLDER [[@folder@]])
 set(ARGUMENTS [[@arguments@]])
