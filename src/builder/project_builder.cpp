@@ -306,27 +306,34 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
 
 namespace {
 
-void ExportFolder(Project& project, const ProjectConfig& config, const ProjectFolder& folder) {
-  const ConfigSettings& settings = *project.settings;
-  const bool readOnly = settings.makeExportedHeaderFilesReadOnly;
+void AddPublicFiles(const ProjectFolder& folder, std::vector<const ProjectFile*>& files) {
   for (const ProjectFile* file : folder.files) {
-    if (file->excluded) continue;
-    const std::string source = project.SourcePath(*file);
-    const std::string translated = project.usesQrex ? PathJoin(TranslationDirectory(config), file->path) : source;
-    CopyIfNewer(settings.leftovers, translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
-    CopyIfNewer(settings.leftovers, source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
+    if (!file->excluded) files.push_back(file);
   }
   for (const auto& subfolder : folder.subfolders) {
-    if (&folder == &project.rootFolder && subfolder->name == "src") continue;
-    ExportFolder(project, config, *subfolder);
+    if (&folder == &folder.project->rootFolder && subfolder->name == "src") continue;
+    AddPublicFiles(*subfolder, files);
   }
 }
 
 }  // namespace
 
-void ExportPublicHeaders(Project& project, ProjectConfig& config) {
+std::vector<const ProjectFile*> PublicFiles(Project& project) {
   project.CollectFiles();
-  ExportFolder(project, config, project.rootFolder);
+  std::vector<const ProjectFile*> files;
+  AddPublicFiles(project.rootFolder, files);
+  return files;
+}
+
+void ExportPublicHeaders(Project& project, ProjectConfig& config) {
+  const ConfigSettings& settings = *project.settings;
+  const bool readOnly = settings.makeExportedHeaderFilesReadOnly;
+  for (const ProjectFile* file : PublicFiles(project)) {
+    const std::string source = project.SourcePath(*file);
+    const std::string translated = project.usesQrex ? PathJoin(TranslationDirectory(config), file->path) : source;
+    CopyIfNewer(settings.leftovers, translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
+    CopyIfNewer(settings.leftovers, source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
+  }
 }
 
 }  // namespace qrex

@@ -67,6 +67,8 @@ class ProjectBuilder : public BuildFiles {
   bool m_hasFaultyFiles = false;
 };
 
+// What is outside the project's `src` folder.
+std::vector<const ProjectFile*> PublicFiles(Project& project);
 // Copies what is outside the project's `src` folder to the export directories, translated and as it is.
 void ExportPublicHeaders(Project& project, ProjectConfig& config);
 

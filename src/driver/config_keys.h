@@ -25,6 +25,8 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"sizeofPointer", &ConfigSettings::sizeofPointer, "@size_of_pointer"},
     {"platformToolset", &ConfigSettings::platformToolset,
      "the tool set in .vcxproj files: v143; projects may name theirs, too"},
+    {"sourceFolder", &ConfigSettings::sourceFolder, "where relative roots begin, if not where Qrex runs"},
+    {"depfile", &ConfigSettings::depfile, "the file to write what the run read into, as make and ninja read it"},
     {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
     {"buildTrace", &ConfigSettings::buildTrace, "a file for the trace of a build, as trace viewers read it"},
 };

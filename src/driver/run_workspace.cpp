@@ -6,6 +6,8 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "driver/depfile.h"
+#include "driver/listing.h"
 #include "driver/observers.h"
 #include "driver/project_queue.h"
 #include "driver/run_hints.h"
@@ -167,6 +169,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     }
     if (!m_queue.Finish()) return false;
   }
+  if (m_queue.Errors() == 0 && !WriteDepfile(m_workspace, m_generator.Files())) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
@@ -441,6 +444,14 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   observers.Expect(run->Loaded());
   const bool succeeded = run->LoadAll() && run->Run(timer);
   return observers.End() && succeeded;
+}
+
+bool ListWorkspace(ConfigSettings& settings, std::string& list) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings);
+  if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
+  list = ListingOf(run.Loaded());
+  return true;
 }
 
 }  // namespace qrex

@@ -3,6 +3,7 @@
 
 #include <map>
 #include <memory>
+#include <set>
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -33,6 +34,7 @@ struct ConfigSettings {
   MacroWorld macroWorld;
   MpfwContext context{sourceFiles, macroWorld};
   std::vector<std::string> virtualTree;
+  std::string sourceFolder;  // where relative roots begin; empty: the folder of the run
   std::string exportLib;
   std::string exportTranslatedInclude;
   std::string exportUntranslatedInclude;
@@ -64,10 +66,12 @@ struct ConfigSettings {
   std::string buildTrace;                       // the file of a trace; empty: none is written
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
+  std::string depfile;                // to be written behind a run; empty: none
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   // Whoever may read the settings may write files and run tools.
   mutable LeftoverSweep leftovers;
+  mutable std::set<std::string> listedFolders;  // those that were searched by wildcards
   mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
   mutable platform::Processes tools;
   std::unique_ptr<platform::JobServer> jobServer;  // of the make that runs this program; null: none
