@@ -312,6 +312,7 @@ void Processes::ReapOne() {
 // Its tools do not outlive it.
 void Processes::LoseKeeper() {
   m_keeper.reset();
+  ToolKeeper::EndWhatIsLeft();
   while (!m_running.empty()) End(*m_running.front(), BySignal(SIGKILL));
 }
 
