@@ -44,7 +44,7 @@ struct ToolTask {
 
 struct ToolMessage {
   Severity severity = Severity::Error;
-  std::string text;       // the line as the tool printed it
+  std::string text;       // what the tool printed behind the place
   SourcePlace place;      // as the tool named it
   SourcePlace generated;  // where that was followed back to a source: what the tool named
 };

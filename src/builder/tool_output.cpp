@@ -70,7 +70,7 @@ class OutputScanner {
       if (ReadMessage(line, begin, at, message)) {
         const bool isCounted = Count(message.rest);
         const SourcePlace source = PointAtSource(line.substr(0, begin), message);
-        if (isCounted && m_builder.settings.observer) TellObserver(line, message, source);
+        if (isCounted && m_builder.settings.observer) TellObserver(message, source);
         if (isCounted && !first) first = static_cast<size_t>(message.rest.data() - line.data());
         at = message.end;
       } else {
@@ -80,10 +80,10 @@ class OutputScanner {
     return first;
   }
 
-  void TellObserver(std::string_view line, const MessageInLine& message, const SourcePlace& source) const {
+  void TellObserver(const MessageInLine& message, const SourcePlace& source) const {
     ToolMessage told;
     told.severity = StartsWith(message.rest, "error") ? Severity::Error : Severity::Warning;
-    told.text = line;
+    told.text = message.rest;
     told.place = {std::string(message.file), message.line};
     if (!source.file.empty()) told.generated = std::exchange(told.place, source);
     m_builder.settings.observer->Take(told);

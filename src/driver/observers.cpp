@@ -5,6 +5,7 @@
 #include "platform/console.h"
 #include "report/trace_file.h"
 #include "text/files.h"
+#include "text/version.h"
 
 namespace qrex {
 
@@ -37,8 +38,8 @@ class RunObservers::ToAll : public BuildObserver {
   void Take(const ToolMessage& message) override {
     for (BuildObserver* each : m_all) each->Take(message);
   }
-  void StepIsOver(ToolId lastTool, bool succeeded) override {
-    for (BuildObserver* each : m_all) each->StepIsOver(lastTool, succeeded);
+  void StepIsOver(ToolId lastTool, bool completed) override {
+    for (BuildObserver* each : m_all) each->StepIsOver(lastTool, completed);
   }
   int Patience() const override {
     const int first = m_all[0]->Patience(), second = m_all[1]->Patience();
@@ -59,7 +60,7 @@ RunObservers::RunObservers(ConfigSettings& settings)
   if (settings.mode != RunMode::Build && settings.mode != RunMode::Compile) return;
   settings.coloursToolMessages = platform::StdoutTakesColours();
   if (platform::StatusColumns() != 0) settings.observer = (m_progress = std::make_unique<Progress>(settings)).get();
-  if (settings.buildTrace.empty()) return;
+  if (settings.buildTrace.empty() && settings.report.empty()) return;
   m_record = std::make_unique<BuildRecord>(*settings.macroWorld.messages);
   settings.macroWorld.messages = m_record.get();
   settings.observer = m_record.get();
@@ -68,13 +69,19 @@ RunObservers::RunObservers(ConfigSettings& settings)
   settings.observer = m_all.get();
 }
 
-RunObservers::~RunObservers() { End(); }
+RunObservers::~RunObservers() { End(false); }
 
 void RunObservers::Expect(const Workspace& workspace) {
   if (m_progress) m_progress->Expect(workspace);
 }
 
-bool RunObservers::End() {
+PageHeading RunObservers::Heading(bool completed) const {
+  std::string names;
+  for (const std::string& name : m_settings.workspaces) names += (names.empty() ? "" : ", ") + name;
+  return {names, m_settings.config + " | " + m_settings.platform + " | Qrex " + std::string(Version()), completed};
+}
+
+bool RunObservers::End(bool completed) {
   if (std::exchange(m_hasEnded, true)) return true;
   m_settings.observer = nullptr;
   m_settings.macroWorld.messages = m_messagesBefore;
@@ -83,6 +90,9 @@ bool RunObservers::End() {
   m_record->End();
   bool isWritten = true;
   if (!m_settings.buildTrace.empty()) isWritten = Write(m_settings.buildTrace, TraceText(*m_record));
+  if (!m_settings.report.empty()) {
+    isWritten = Write(m_settings.report, PageText(*m_record, Heading(completed))) && isWritten;
+  }
   return isWritten;
 }
 

@@ -7,6 +7,7 @@
 #include "builder/build_observer.h"
 #include "driver/progress.h"
 #include "report/build_record.h"
+#include "report/page.h"
 #include "workspace/workspace.h"
 
 namespace qrex {
@@ -20,10 +21,11 @@ class RunObservers {
 
   void Expect(const Workspace& workspace);
   // Writes what the settings ask for. False: a file could not be written, and a message has told.
-  bool End();
+  bool End(bool completed);
 
  private:
   class ToAll;
+  PageHeading Heading(bool completed) const;
   bool Write(const std::string& path, const std::string& text) const;
 
   ConfigSettings& m_settings;

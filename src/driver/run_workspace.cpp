@@ -37,6 +37,7 @@ class WorkspaceRun {
   bool LoadAll();
   bool Run(ScopeTimer& timer);
   const Workspace& Loaded() const { return m_workspace; }
+  bool IsCompleted() const { return m_isCompleted; }  // else an error has ended it early
 
  private:
   bool LoadWorkspaceFile(const std::string& entry);
@@ -61,6 +62,7 @@ class WorkspaceRun {
   Generator m_generator{m_settings.leftovers};
   ProjectQueue m_queue{m_settings};
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
+  bool m_isCompleted = false;
 };
 
 std::string PrintedList(const std::vector<std::string>& entries) {
@@ -173,6 +175,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
+  m_isCompleted = true;
   if (m_queue.Warnings() > 0 || m_queue.Errors() > 0) {
     timer.Label() << " with " << m_queue.Warnings() << " warnings, " << m_queue.Errors() << " errors";
   }
@@ -345,6 +348,7 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Compile completed";
+  m_isCompleted = true;
   return true;
 }
 
@@ -443,7 +447,7 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   RunObservers observers(settings);
   observers.Expect(run->Loaded());
   const bool succeeded = run->LoadAll() && run->Run(timer);
-  return observers.End() && succeeded;
+  return observers.End(run->IsCompleted()) && succeeded;
 }
 
 bool ListWorkspace(ConfigSettings& settings, std::string& list) {

@@ -105,8 +105,9 @@ void BuildRecord::Take(const Message& message) {
   m_next.Take(message);
 }
 
-const MakeReason* BuildRecord::Why(const std::string& output) const {
-  const auto found = m_reasons.find(output);
+const MakeReason* BuildRecord::Why(const Span& span) const {
+  if (!span.writes) return nullptr;
+  const auto found = m_reasons.find(span.task.output);
   if (found == m_reasons.end()) return nullptr;
   if (found->second.cause != MakeReason::Cause::Changed) return &found->second;
   const auto translated = m_outputOf.find(found->second.file);

@@ -54,7 +54,7 @@ class BuildRecord : public BuildObserver, public MessageConsumer {
   void Take(const Message& message) override;
   void End();  // of the run: what still runs ends here
   // Of what was made by a text that was made in this run, that text's own. Null: none is known.
-  const MakeReason* Why(const std::string& output) const;
+  const MakeReason* Why(const Span& span) const;
 
   const int64_t begin;
   int64_t end = 0;

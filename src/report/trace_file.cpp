@@ -39,7 +39,7 @@ void WriteSpan(JsonWriter& json, const BuildRecord& record, const Span& span) {
   json.Member("pid", int64_t{1}).Member("tid", static_cast<int64_t>(span.slot));
   json.Member("ts", (span.begin - record.begin) / kMicrosecond).Member("dur", (span.end - span.begin) / kMicrosecond);
   json.Key("args").Open('{').Member("project", span.task.project).Member("output", span.task.output);
-  if (const MakeReason* why = record.Why(span.task.output)) json.Member("why", ReasonText(*why));
+  if (const MakeReason* why = record.Why(span)) json.Member("why", ReasonText(*why));
   if (!span.isOver) json.Member("ended", "with the run");
   if (span.hasFailed) json.Member("failed", true);
   json.Close('}').Close('}');

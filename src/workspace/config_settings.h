@@ -64,6 +64,7 @@ struct ConfigSettings {
   bool failOnErrors = false;
   bool keepGoing = false;                       // an error in a source ends its translation, and not the run
   std::string buildTrace;                       // the file of a trace; empty: none is written
+  std::string report;                           // and that of a page
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   std::string depfile;                // to be written behind a run; empty: none
