@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "builder/build_files.h"
+#include "builder/project_prints.h"
 #include "builder/scheduler.h"
 
 namespace qrex {
@@ -34,7 +35,7 @@ class ProjectBuilder : public BuildFiles {
 
  private:
   struct Object {
-    int64_t time = 0;
+    FileStamp stamp;
     const ProjectFile* source = nullptr;
   };
 
@@ -59,6 +60,8 @@ class ProjectBuilder : public BuildFiles {
   std::unique_ptr<BuildStep> LinkIfStale();
   std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 
+  std::optional<ProjectPrints> m_prints;  // where the key asks for them
+  uint64_t m_linkPrint = 0;
   std::string m_dependencyFile;
   std::string m_linked;                               // the target, while it is
   std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
