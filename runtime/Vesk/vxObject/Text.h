@@ -8,6 +8,7 @@
 #include <charconv>
 #include <cstring>
 #include <iostream>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 
@@ -17,10 +18,18 @@ template <typename C>
 class basic_xstring : public std::basic_string<C> {
  public:
   typedef std::basic_string<C> base;
+  using typename base::const_iterator;
+  using typename base::iterator;
   using base::base;
+  using base::insert;
   basic_xstring() {}
   basic_xstring(base const& text) : base(text) {}
   basic_xstring(base&& text) : base(std::move(text)) {}
+  // A hook may have taken the position away since it was asked for: std::out_of_range.
+  iterator insert(const_iterator at, C const* first, C const* last) {
+    if (at - base::cbegin() > base::cend() - base::cbegin()) throw std::out_of_range("position to insert at");
+    return base::insert(at, first, last);
+  }
 };
 typedef basic_xstring<char8> string8;
 typedef basic_xstring<char16> string16;
