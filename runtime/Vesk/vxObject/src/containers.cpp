@@ -1,6 +1,8 @@
-// Containers whose elements are known only by their type, through containers of stand-ins (see ValueTypes.h).
+// Containers whose elements are known only by their type, through containers of stand-ins (see ValueTypes.h). Each view
+// takes the time to compile all that it is asked for.
 
 @import "Vesk/vxObject/ValueTypes.h"
+@import "deques.h"
 
 namespace vesk {
 
@@ -11,79 +13,128 @@ struct DynArrayView {
 
 namespace {
 
-// What the stand-ins of the container that is worked on stand for. Without a type they stand for nothing.
-struct Work {
-  ValueType const* m_type = nullptr;
-  ValueFunction const* m_fill = nullptr;
-  void* m_node = nullptr;  // the last one that was allocated
+// --- Lists and trees: one view of each kind, whose nodes have room for what is really in them
 
-  static Work& Current() {
-    static thread_local Work work;
-    return work;
+// Where an entry stands in its node depends on its alignment alone: a node that was just made tells.
+template <std::size_t Align>
+struct Probe {
+  friend bool operator<(Probe const&, Probe const&) { return false; }
+  alignas(Align) octet_t m_bytes[Align];
+};
+thread_local void* t_node = nullptr;  // the last one that was allocated
+template <typename Node>
+struct ProbeAllocator {
+  typedef Node value_type;
+  ProbeAllocator() {}
+  template <typename Other>
+  ProbeAllocator(ProbeAllocator<Other> const&) {}
+  Node* allocate(std::size_t count) {
+    t_node = ::operator new(count * sizeof(Node));
+    return static_cast<Node*>(t_node);
   }
+  void deallocate(Node* node, std::size_t) { ::operator delete(static_cast<void*>(node)); }
+  friend bool operator==(ProbeAllocator const&, ProbeAllocator const&) { return true; }
+  friend bool operator!=(ProbeAllocator const&, ProbeAllocator const&) { return false; }
 };
 
-struct WorkScope {
-  explicit WorkScope(ValueType const* type, ValueFunction const* fill = nullptr)
-      : m_outer(std::exchange(Work::Current(), {type, fill, nullptr})) {}
-  ~WorkScope() { Work::Current() = m_outer; }
-  WorkScope(WorkScope const&) = delete;
-  void operator=(WorkScope const&) = delete;
-  Work m_outer;
+template <typename Entry>
+std::size_t OffsetOf(Entry const& entry) {
+  return static_cast<std::size_t>(static_cast<octet_t const*>(entry.m_bytes) - static_cast<octet_t const*>(t_node));
+}
+struct NodeOffsets {
+  std::size_t m_list, m_tree;
+};
+template <std::size_t Align>
+NodeOffsets ProbeOffsets() {
+  typedef Probe<Align> Entry;
+  NodeOffsets offsets;
+  std::list<Entry, ProbeAllocator<Entry>> list;
+  offsets.m_list = OffsetOf(*list.emplace(list.end()));
+  std::multiset<Entry, std::less<Entry>, ProbeAllocator<Entry>> tree;
+  offsets.m_tree = OffsetOf(*tree.insert(Entry()));
+  return offsets;
+}
+
+constexpr std::size_t kViewAlign = 8;
+
+std::size_t OffsetInNode(ValueType const& type, std::size_t align) {
+  static const NodeOffsets offsets[] = {ProbeOffsets<1>(), ProbeOffsets<2>(), ProbeOffsets<4>(), ProbeOffsets<8>(),
+                                        ProbeOffsets<16>()};
+  std::size_t at = 0;
+  while (at < 5 && align != std::size_t(1) << at) ++at;
+  if (at == 5) throw AccessError("alignment of the elements of " + type.m_text);
+  return type.m_code == RC_LIST ? offsets[at].m_list : offsets[at].m_tree;
+}
+
+// How far behind its stand-in an entry is.
+ssize_t ShiftOf(ValueType const& type) {
+  return static_cast<ssize_t>(OffsetInNode(type, type.EntryAlign()) - OffsetInNode(type, kViewAlign));
+}
+
+// What the stand-ins of the container that is worked on stand for. Without a type they stand for nothing.
+struct Work {
+  explicit Work(ValueType const& type, ValueFunction const* fill = nullptr)
+      : m_type(type), m_fill(fill), m_shift(ShiftOf(type)), m_outer(std::exchange(s_current, this)) {}
+  ~Work() { s_current = m_outer; }
+  Work(Work const&) = delete;
+  void operator=(Work const&) = delete;
+
+  ValueType const& m_type;
+  ValueFunction const* m_fill;
+  ssize_t m_shift;
+  Work* m_outer;
+  static inline thread_local Work* s_current = nullptr;
 };
 
 struct MakeTag {};
 
 // An entry of a list or tree.
-template <std::size_t Align>
 struct StandIn {
   explicit StandIn(MakeTag) {
-    Work const& work = Work::Current();
-    ValueType const* type = work.m_type;
-    if (!type) return;
-    ValueType const& first = type->m_key ? *type->m_key : *type->m_item;
-    MakeValue(first, this);
+    Work const* work = Work::s_current;
+    if (!work) return;
+    ValueType const& type = work->m_type;
+    ValueType const& first = type.m_key ? *type.m_key : *type.m_item;
+    void* const at = At(work->m_shift);
+    MakeValue(first, at);
     try {
-      if (work.m_fill) (*work.m_fill)(this);
-      if (type->m_key) MakeValue(*type->m_item, type->ItemOf(this));
+      if (work->m_fill) (*work->m_fill)(at);
+      if (type.m_key) MakeValue(*type.m_item, type.ItemOf(at));
     } catch (...) {
-      DestroyValue(first, this);
+      DestroyValue(first, at);
       throw;
     }
   }
   ~StandIn() {
-    ValueType const* type = Work::Current().m_type;
-    if (!type) return;
-    DestroyValue(*type->m_item, type->ItemOf(this));
-    if (type->m_key) DestroyValue(*type->m_key, this);
+    Work const* work = Work::s_current;
+    if (!work) return;
+    ValueType const& type = work->m_type;
+    void* const at = At(work->m_shift);
+    DestroyValue(*type.m_item, type.ItemOf(at));
+    if (type.m_key) DestroyValue(*type.m_key, at);
   }
   StandIn(StandIn const&) = delete;
   void operator=(StandIn const&) = delete;
+  void* At(ssize_t shift) const { return const_cast<octet_t*>(m_bytes) + shift; }
 
-  alignas(Align) octet_t m_bytes[Align];
+  alignas(kViewAlign) octet_t m_bytes[kViewAlign];
 };
 
-template <typename C>
-std::size_t NodeOffset();
-
 // Nodes as large as those of the container that is worked on.
-template <typename Node, typename C>
+template <typename Node>
 struct NodeAllocator {
   typedef Node value_type;
-  template <typename Other>
-  struct rebind {
-    typedef NodeAllocator<Other, C> other;
-  };
   NodeAllocator() {}
   template <typename Other>
-  NodeAllocator(NodeAllocator<Other, C> const&) {}
+  NodeAllocator(NodeAllocator<Other> const&) {}
 
   Node* allocate(std::size_t) {
-    Work& work = Work::Current();
     std::size_t size = sizeof(Node);
-    if (work.m_type) size = RoundUp(NodeOffset<C>() + work.m_type->EntrySize(), alignof(Node));
-    work.m_node = ::operator new(size);
-    return static_cast<Node*>(work.m_node);
+    if (Work const* work = Work::s_current) {
+      ValueType const& type = work->m_type;
+      size = RoundUp(OffsetInNode(type, type.EntryAlign()) + type.EntrySize(), alignof(Node));
+    }
+    return static_cast<Node*>(::operator new(size));
   }
   void deallocate(Node* node, std::size_t) { ::operator delete(static_cast<void*>(node)); }
   static std::size_t RoundUp(std::size_t size, std::size_t align) { return (size + align - 1) / align * align; }
@@ -93,110 +144,57 @@ struct NodeAllocator {
 };
 
 struct LessKey {
-  template <typename T>
-  bool operator()(T const& a, T const& b) const {
-    ValueType const& type = *Work::Current().m_type;
-    return LessValue(type.m_key ? *type.m_key : *type.m_item, &a, &b);
+  bool operator()(StandIn const& a, StandIn const& b) const {
+    Work const& work = *Work::s_current;
+    return LessValue(work.m_type.m_key ? *work.m_type.m_key : *work.m_type.m_item, a.At(work.m_shift),
+                     b.At(work.m_shift));
   }
 };
 
-template <std::size_t A>
-struct ListView : std::list<StandIn<A>, NodeAllocator<StandIn<A>, ListView<A>>> {
-  void* Make() { return &this->emplace_back(MakeTag()); }
+struct ListView : std::list<StandIn, NodeAllocator<StandIn>> {
+  StandIn const* Make() { return &this->emplace_back(MakeTag()); }
 };
-template <std::size_t A>
-struct SetView : std::set<StandIn<A>, LessKey, NodeAllocator<StandIn<A>, SetView<A>>> {
-  void* Make() {
+struct SetView : std::set<StandIn, LessKey, NodeAllocator<StandIn>> {
+  StandIn const* Make() {
     const auto [at, isNew] = this->emplace(MakeTag());
-    return isNew ? const_cast<StandIn<A>*>(&*at) : nullptr;
+    return isNew ? &*at : nullptr;
   }
 };
-template <std::size_t A>
-struct BagView : std::multiset<StandIn<A>, LessKey, NodeAllocator<StandIn<A>, BagView<A>>> {
-  void* Make() { return const_cast<StandIn<A>*>(&*this->emplace(MakeTag())); }
+struct BagView : std::multiset<StandIn, LessKey, NodeAllocator<StandIn>> {
+  StandIn const* Make() { return &*this->emplace(MakeTag()); }
 };
-static_assert(sizeof(ListView<8>) == sizeof(std::list<int128>) && sizeof(SetView<8>) == sizeof(std::set<int128>) &&
-                  sizeof(SetView<1>) == sizeof(std::map<char, int128>),
+static_assert(sizeof(ListView) == sizeof(std::list<int128>) && sizeof(SetView) == sizeof(std::set<int128>) &&
+                  sizeof(SetView) == sizeof(std::map<char, int128>),
               "containers of one kind are laid out alike");
 
-// Where an entry stands in its node.
-template <typename C>
-std::size_t NodeOffset() {
-  static const std::size_t offset = [] {
-    const WorkScope scope(nullptr);
-    C container;
-    void const* entry = container.Make();
-    return static_cast<std::size_t>(static_cast<octet_t const*>(entry) -
-                                    static_cast<octet_t const*>(Work::Current().m_node));
-  }();
-  return offset;
-}
-
 // Calls `action` with the container as its view.
-template <template <std::size_t> class View, typename Action>
-auto WithAlign(ValueType const& type, void* container, Action action) {
-  switch (type.EntryAlign()) {
-    case 1:
-      return action(*static_cast<View<1>*>(container));
-    case 2:
-      return action(*static_cast<View<2>*>(container));
-    case 4:
-      return action(*static_cast<View<4>*>(container));
-    case 8:
-      return action(*static_cast<View<8>*>(container));
-    case 16:
-      return action(*static_cast<View<16>*>(container));
-  }
-  throw AccessError("alignment of the elements of " + type.m_text);
+template <typename Action>
+auto WithView(ValueType const& type, void* container, Action action) {
+  if (type.m_code == RC_LIST) return action(*static_cast<ListView*>(container));
+  if (type.m_code == RC_BAG) return action(*static_cast<BagView*>(container));
+  return action(*static_cast<SetView*>(container));
 }
 
-// --- Deques: their blocks depend on the size of an element
+// --- Deques
 
-template <std::size_t Size>
-struct Bytes {
-  octet_t m_bytes[Size];
-};
-
-struct DequeOps {
-  std::size_t (*m_count)(void const*);
-  octet_t* (*m_at)(void*, std::size_t);
-  void (*m_add)(void*);
-  void (*m_removeLast)(void*);
-  void (*m_make)(void*);
-  void (*m_destroy)(void*);
-};
-
-template <std::size_t Size>
-DequeOps const& DequeOpsOf() {
-  typedef std::deque<Bytes<Size>> View;
-  static const DequeOps ops = {[](void const* deque) { return static_cast<View const*>(deque)->size(); },
-                               [](void* deque, std::size_t i) { return (*static_cast<View*>(deque))[i].m_bytes; },
-                               [](void* deque) { static_cast<View*>(deque)->emplace_back(); },
-                               [](void* deque) { static_cast<View*>(deque)->pop_back(); },
-                               [](void* deque) { new (deque) View(); },
-                               [](void* deque) { static_cast<View*>(deque)->~View(); }};
-  return ops;
-}
-
-constexpr std::size_t kDequeStep = 4;
-constexpr std::size_t kLargestDequeElement = 256;
-
-template <std::size_t... I>
-DequeOps const& DequeOpsOfSize(std::size_t size, std::index_sequence<I...>) {
-  typedef DequeOps const& (*Function)();
-  static constexpr Function table[] = {&DequeOpsOf<(I + 1) * kDequeStep>...};
-  return table[size / kDequeStep - 1]();
-}
-
-DequeOps const& DequeOpsFor(ValueType const& type) {
+std::size_t DequeSize(ValueType const& type) {
   const std::size_t size = type.m_item->m_size;
-  if (size == 1) return DequeOpsOf<1>();
-  if (size == 2) return DequeOpsOf<2>();
-  if (size == 0 || size % kDequeStep != 0 || size > kLargestDequeElement) {
-    throw AccessError("size of the elements of " + type.m_text);
-  }
-  return DequeOpsOfSize(size, std::make_index_sequence<kLargestDequeElement / kDequeStep>());
+  if (!DequeView::IsSize(size)) throw AccessError("size of the elements of " + type.m_text);
+  return size;
 }
+
+// One that is made whole, and then takes the place of another one, whose elements are destroyed.
+struct NewDeque {
+  NewDeque(ValueType const& type, ssize_t count) : m_size(DequeSize(type)), m_view(m_size, count) {}
+  ~NewDeque() { m_view.Free(m_size); }
+  NewDeque(NewDeque const&) = delete;
+  void operator=(NewDeque const&) = delete;
+  void Replace(void* deque) { static_cast<std::deque<octet_t>*>(deque)->swap(*static_cast<std::deque<octet_t>*>(At())); }
+  void* At() { return &m_view; }
+
+  std::size_t m_size;
+  DequeView m_view;
+};
 
 // --- Vectors and arrays: elements side by side
 
@@ -222,16 +220,15 @@ void MakeElements(ValueType const& item, octet_t* first, ssize_t count) {
 bool IsSideBySide(octet_t code) { return code == RC_VECTOR || code == RC_ARRAY || code == RC_DYNARRAY; }
 
 void ResizeDeque(ValueType const& type, void* deque, ssize_t count) {
-  DequeOps const& ops = DequeOpsFor(type);
-  for (ssize_t i = 0; i < count; ++i) {
-    ops.m_add(deque);
-    try {
-      MakeValue(*type.m_item, ops.m_at(deque, i));
-    } catch (...) {
-      ops.m_removeLast(deque);
-      throw;
-    }
+  NewDeque made(type, count);
+  ssize_t i = 0;
+  try {
+    for (; i < count; ++i) MakeValue(*type.m_item, made.m_view.At(made.m_size, i));
+  } catch (...) {
+    while (i > 0) DestroyValue(*type.m_item, made.m_view.At(made.m_size, --i));
+    throw;
   }
+  made.Replace(deque);
 }
 
 void ResizeSideBySide(ValueType const& type, void* container, ssize_t count) {
@@ -256,7 +253,6 @@ void ResizeSideBySide(ValueType const& type, void* container, ssize_t count) {
 
 ssize_t CountOf(ValueType const& type, void const* container) {
   void* const at = const_cast<void*>(container);
-  auto size = [](auto& view) { return static_cast<ssize_t>(view.size()); };
   switch (type.m_code) {
     case RC_ARRAY:
       return type.m_count;
@@ -266,13 +262,9 @@ ssize_t CountOf(ValueType const& type, void const* container) {
       return IsBits(type) ? static_cast<ssize_t>(BitsOf(at).size())
                           : static_cast<ssize_t>(BytesOf(at).size() / type.m_item->m_size);
     case RC_DEQUE:
-      return static_cast<ssize_t>(DequeOpsFor(type).m_count(container));
-    case RC_LIST:
-      return WithAlign<ListView>(type, at, size);
-    case RC_BAG:
-      return WithAlign<BagView>(type, at, size);
+      return static_cast<ssize_t>(DequeView::Of(container).Count(DequeSize(type)));
     default:
-      return WithAlign<SetView>(type, at, size);
+      return WithView(type, at, [](auto& view) { return static_cast<ssize_t>(view.size()); });
   }
 }
 
@@ -290,26 +282,25 @@ void EachEntry(ValueType const& type, void* container, std::function<bool(void*)
     return;
   }
   if (type.m_code == RC_DEQUE) {
-    DequeOps const& ops = DequeOpsFor(type);
-    const std::size_t count = ops.m_count(container);
-    for (std::size_t i = 0; i < count && each(ops.m_at(container, i)); ++i) {
+    const std::size_t size = DequeSize(type);
+    DequeView const& view = DequeView::Of(container);
+    const std::size_t count = view.Count(size);
+    for (std::size_t i = 0; i < count && each(view.At(size, i)); ++i) {
     }
     return;
   }
-  auto walk = [&each](auto& view) {
-    for (auto& entry : view) {
-      if (!each(const_cast<octet_t*>(entry.m_bytes))) return;
+  const ssize_t shift = ShiftOf(type);
+  WithView(type, container, [&each, shift](auto& view) {
+    for (StandIn const& entry : view) {
+      if (!each(entry.At(shift))) return;
     }
-  };
-  if (type.m_code == RC_LIST) return WithAlign<ListView>(type, container, walk);
-  if (type.m_code == RC_BAG) return WithAlign<BagView>(type, container, walk);
-  WithAlign<SetView>(type, container, walk);
+  });
 }
 
 void* EntryOf(ValueType const& type, void* container, ssize_t position) {
   if (IsBits(type)) return container;
   if (IsSideBySide(type.m_code)) return FirstOf(type, container) + position * type.m_item->m_size;
-  if (type.m_code == RC_DEQUE) return DequeOpsFor(type).m_at(container, position);
+  if (type.m_code == RC_DEQUE) return DequeView::Of(container).At(DequeSize(type), position);
   void* found = nullptr;
   EachEntry(type, container, [&](void* entry) {
     found = entry;
@@ -319,7 +310,6 @@ void* EntryOf(ValueType const& type, void* container, ssize_t position) {
 }
 
 void MakeContainer(ValueType const& type, void* container) {
-  auto make = [](auto& view) { new (&view) std::decay_t<decltype(view)>(); };
   switch (type.m_code) {
     case RC_ARRAY:
       return MakeElements(*type.m_item, static_cast<octet_t*>(container), type.m_count);
@@ -334,28 +324,30 @@ void MakeContainer(ValueType const& type, void* container) {
       }
       return;
     case RC_DEQUE:
-      return DequeOpsFor(type).m_make(container);
-    case RC_LIST:
-      return WithAlign<ListView>(type, container, make);
-    case RC_BAG:
-      return WithAlign<BagView>(type, container, make);
+      new (container) DequeView(DequeSize(type), 0);
+      return;
     default:
-      return WithAlign<SetView>(type, container, make);
+      WithView(type, container, [](auto& view) { new (&view) std::decay_t<decltype(view)>(); });
   }
+}
+
+static void DestroyElements(ValueType const& type, void* container) {
+  EachEntry(type, container, [&type](void* element) {
+    DestroyValue(*type.m_item, element);
+    return true;
+  });
 }
 
 void ClearContainer(ValueType const& type, void* container) {
   if (IsBits(type)) return BitsOf(container).clear();
-  if (IsSideBySide(type.m_code) || type.m_code == RC_DEQUE) {
-    EachEntry(type, container, [&type](void* element) {
-      DestroyValue(*type.m_item, element);
-      return true;
-    });
+  if (type.m_code == RC_DEQUE) {
+    NewDeque empty(type, 0);
+    DestroyElements(type, container);
+    return empty.Replace(container);
+  }
+  if (IsSideBySide(type.m_code)) {
+    DestroyElements(type, container);
     if (type.m_code == RC_VECTOR) xvector<octet_t>().swap(BytesOf(container));
-    if (type.m_code == RC_DEQUE) {
-      DequeOpsFor(type).m_destroy(container);
-      DequeOpsFor(type).m_make(container);
-    }
     if (type.m_code == RC_DYNARRAY && DynArrayView::Items(container)) {
       const std::size_t size = static_cast<std::size_t>(DynArrayView::Size(container)) * type.m_item->m_size;
       std::allocator<octet_t>().deallocate(DynArrayView::Items(container), size);
@@ -364,21 +356,20 @@ void ClearContainer(ValueType const& type, void* container) {
     }
     return;
   }
-  const WorkScope scope(&type);
-  auto clear = [](auto& view) { view.clear(); };
-  if (type.m_code == RC_LIST) return WithAlign<ListView>(type, container, clear);
-  if (type.m_code == RC_BAG) return WithAlign<BagView>(type, container, clear);
-  WithAlign<SetView>(type, container, clear);
+  const Work work(type);
+  WithView(type, container, [](auto& view) { view.clear(); });
 }
 
 void DestroyContainer(ValueType const& type, void* container) {
+  if (type.m_code == RC_DEQUE) {
+    DestroyElements(type, container);
+    return DequeView::Of(container).Free(DequeSize(type));
+  }
   ClearContainer(type, container);
   if (IsBits(type)) {
     BitsOf(container).~xvector<bool>();
   } else if (type.m_code == RC_VECTOR) {
     BytesOf(container).~xvector<octet_t>();
-  } else if (type.m_code == RC_DEQUE) {
-    DequeOpsFor(type).m_destroy(container);
   }
 }
 
@@ -386,17 +377,15 @@ void ResizeList(ValueType const& type, void* container, ssize_t count) {
   ClearContainer(type, container);
   if (type.m_code == RC_DEQUE) return ResizeDeque(type, container, count);
   if (type.m_code != RC_LIST) return ResizeSideBySide(type, container, count);
-  const WorkScope scope(&type);
-  WithAlign<ListView>(type, container, [count](auto& view) {
-    for (ssize_t i = 0; i < count; ++i) view.Make();
-  });
+  const Work work(type);
+  for (ssize_t i = 0; i < count; ++i) static_cast<ListView*>(container)->Make();
 }
 
 void* InsertEntry(ValueType const& type, void* container, ValueFunction const& fill) {
-  const WorkScope scope(&type, &fill);
-  auto make = [](auto& view) { return view.Make(); };
-  if (type.m_code == RC_BAG) return WithAlign<BagView>(type, container, make);
-  return WithAlign<SetView>(type, container, make);
+  const Work work(type, &fill);
+  StandIn const* const entry = type.m_code == RC_BAG ? static_cast<BagView*>(container)->Make()
+                                                     : static_cast<SetView*>(container)->Make();
+  return entry ? entry->At(work.m_shift) : nullptr;
 }
 
 }  // namespace vesk
