@@ -14,7 +14,7 @@ TOUR = ROOT / "examples" / "tour"
 PLAIN = "g++ -std=c++17 -Wall -Werror -fPIC -fno-gnu-unique"
 # The sources of the library.
 LIBRARY = ("byte_code", "graph", "layout", "models", "objects", "registry", "releases", "remote", "sources", "stack",
-           "vxObject", "access", "containers", "json_reader", "json_scalars", "json_scanner", "json_text", "json_writer", "value_types")
+           "text", "vxObject", "access", "containers", "json_reader", "json_scalars", "json_scanner", "json_text", "json_writer", "value_types")
 
 
 def copy(binary, tree, workspace_file, keys):

@@ -296,7 +296,7 @@ struct GraphState : PerThread<GraphState> {
   void JoinEndOfQueue(DGNode const& node);
   static void LeaveQueue(DGNode const& node);
 
-  void Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
+  void Aim(DGNode const* node);
   // A node whose calculation was unwound waits for the next target, until its own one begins again.
   void Unwind(DGNode const& node);
   bool IsWaiting(DGNode const& node) const;

@@ -21,6 +21,7 @@ GraphState::Rest& GraphState::NeedRest() {
   return *m_rest;
 }
 
+inline void GraphState::Aim(DGNode const* node) { m_targets.push_back({node, ++m_lastSerial}); }
 void GraphState::Unwind(DGNode const& node) {
   if (!m_targets.empty()) node.m_unwound = m_targets.back().m_serial;
 }
