@@ -1,7 +1,7 @@
 // Remote calls: what carries messages within a thread, and how either side makes and reads them.
 
 @import "Vesk/vxObject/IObject.h"
-@import "shared.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <algorithm>
 #include <deque>

@@ -1,6 +1,6 @@
 // Going on on another stack, and back. Sanitizers are told of it.
 
-@import "graph_rest.h"
+@import "Vesk/vxObject/src/parts/graph_rest.h"
 
 #include <algorithm>
 #include <exception>

@@ -1,7 +1,7 @@
 // The tables of what is registered.
 
 @import "Vesk/vxObject/Registry.h"
-@import "shared.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <cstring>
 #include <mutex>

@@ -1,7 +1,7 @@
 // The objects of archives: how they are mentioned, written, read and destroyed; the heap of `$new`.
 
 @import "Vesk/vxObject/IObject.h"
-@import "shared.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <algorithm>
 #include <cstring>

@@ -2,7 +2,7 @@
 // takes the time to compile all that it is asked for.
 
 @import "Vesk/vxObject/ValueTypes.h"
-@import "deques.h"
+@import "Vesk/vxObject/src/parts/deques.h"
 
 namespace vesk {
 
