@@ -44,14 +44,16 @@ struct TableOf {
   static RecordTable& Get() { return Shared<TableOf<R>>().m_table; }
 };
 
-// Whether the record is new. `isLike`: another one of its name.
-static NSE AddRecord(Registered& records, RegisteredRecord record, bool (*isLike)(void const*, void const*)) {
+enum class EAdded { New, Known, Refused };
+
+// `isLike`: whether another one of its name is of the same layout.
+static EAdded AddRecord(Registered& records, RegisteredRecord record, bool (*isLike)(void const*, void const*)) {
   for (RegisteredRecord const& registered : records) {
-    if (registered.m_record == record.m_record) return NSE_OK;
+    if (registered.m_record == record.m_record) return EAdded::Known;
   }
-  if (!records.empty() && !isLike(records.front().m_record, record.m_record)) return NSE_ALREADY_DEFINED;
+  if (!records.empty() && !isLike(records.front().m_record, record.m_record)) return EAdded::Refused;
   records.push_back(record);
-  return NSE_OK;
+  return EAdded::New;
 }
 static RegisteredRecord FindRecord(RecordTable const& table, std::string const& name) {
   const auto at = table.find(name);
@@ -64,12 +66,14 @@ bool IsLike(void const* a, void const* b) {
 }
 template <typename R>
 NSE RegisterRecord(R const* record, XTarget* target) {
-  const NSE result = AddRecord(TableOf<R>::Get()[record->m_name], {record, target}, IsLike<R>);
+  const EAdded added = AddRecord(TableOf<R>::Get()[record->m_name], {record, target}, IsLike<R>);
   if constexpr (std::is_same<R, ReflectedClass>::value) {
-    ReflectedClass const*& latest = target->m_latestModel;
-    if (result == NSE_OK && (!latest || LastRelease(*latest) < LastRelease(*record))) latest = record;
+    if (added == EAdded::New) {
+      ReflectedClass const*& latest = target->m_latestModel;
+      if (!latest || LastRelease(*latest) < LastRelease(*record)) latest = record;
+    }
   }
-  return result;
+  return added == EAdded::Refused ? NSE_ALREADY_DEFINED : NSE_OK;
 }
 template <typename R>
 R const* Find(std::string const& name) {
