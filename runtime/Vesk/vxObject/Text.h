@@ -5,7 +5,6 @@
 
 #include <algorithm>
 #include <atomic>
-#include <charconv>
 #include <cstring>
 #include <iosfwd>
 #include <stdexcept>
@@ -67,15 +66,16 @@ class xostream {
   }
 
   // In the shortest form that reads back as the same number, whatever the locale.
-  template <typename T>
-  void WriteNumber(T value) {
-    if (m_end - m_at >= MostDigits) {
-      m_at = std::to_chars(m_at, m_at + MostDigits, value).ptr;
-      return;
-    }
-    char text[MostDigits];
-    WriteLines(std::string_view(text, std::to_chars(text, text + MostDigits, value).ptr - text));
-  }
+  void WriteNumber(int value);
+  void WriteNumber(unsigned value);
+  void WriteNumber(long value);
+  void WriteNumber(unsigned long value);
+  void WriteNumber(long long value);
+  void WriteNumber(unsigned long long value);
+  void WriteNumber(float value);
+  void WriteNumber(double value);
+  void WriteNumber(long double value);
+  void WriteAddress(void const* address);
 
   void ChangeIndent(int by);
   // For what only a std::ostream prints; no indentation there.
@@ -96,6 +96,8 @@ class xostream {
   void Append(std::string_view text);
   void Grow(std::size_t by);
   void DropStream();
+  template <typename T>
+  void WriteShortest(T value);
 
   char* m_at = nullptr;
   char* m_end = nullptr;
@@ -132,6 +134,12 @@ xostream& xout();
 void AppendUtf8(std::string& text, uint32 c);
 std::string Utf8Text(std::u16string_view units);
 std::string DecimalText(uint128 value);
+
+// Functions have one, too.
+template <typename T>
+void const* AddressOf(T* pointer) {
+  return reinterpret_cast<void const*>(reinterpret_cast<std::uintptr_t>(pointer));
+}
 
 template <typename T>
 constexpr bool IsArithmetic =
@@ -178,10 +186,7 @@ inline xostream& operator<<(xostream& os, string16 const& text) {
 
 template <typename T>
 xostream& operator<<(xostream& os, T* address) {
-  char text[2 + 2 * sizeof(address)] = {'0', 'x'};
-  const std::uintptr_t number = reinterpret_cast<std::uintptr_t>(address);
-  char* end = number ? std::to_chars(text + 2, text + sizeof(text), number, 16).ptr : text + 1;
-  os.Write(std::string_view(text, end - text));
+  os.WriteAddress(AddressOf(address));
   return os;
 }
 

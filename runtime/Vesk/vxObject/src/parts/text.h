@@ -2,6 +2,7 @@
 
 @import "Vesk/vxObject/Text.h"
 
+#include <charconv>
 #include <iostream>
 
 namespace vesk {
@@ -29,6 +30,32 @@ struct xostream::MemoryStream : private std::streambuf, public std::ostream {
   }
   xostream& m_text;
 };
+
+template <typename T>
+inline void xostream::WriteShortest(T value) {
+  if (m_end - m_at >= MostDigits) {
+    m_at = std::to_chars(m_at, m_at + MostDigits, value).ptr;
+    return;
+  }
+  char text[MostDigits];
+  WriteLines(std::string_view(text, static_cast<std::size_t>(std::to_chars(text, text + MostDigits, value).ptr - text)));
+}
+void xostream::WriteNumber(int value) { WriteShortest(value); }
+void xostream::WriteNumber(unsigned value) { WriteShortest(value); }
+void xostream::WriteNumber(long value) { WriteShortest(value); }
+void xostream::WriteNumber(unsigned long value) { WriteShortest(value); }
+void xostream::WriteNumber(long long value) { WriteShortest(value); }
+void xostream::WriteNumber(unsigned long long value) { WriteShortest(value); }
+void xostream::WriteNumber(float value) { WriteShortest(value); }
+void xostream::WriteNumber(double value) { WriteShortest(value); }
+void xostream::WriteNumber(long double value) { WriteShortest(value); }
+
+void xostream::WriteAddress(void const* address) {
+  char text[2 + 2 * sizeof(address)] = {'0', 'x'};
+  const std::uintptr_t number = reinterpret_cast<std::uintptr_t>(address);
+  char* const end = number ? std::to_chars(text + 2, text + sizeof(text), number, 16).ptr : text + 1;
+  Write(std::string_view(text, static_cast<std::size_t>(end - text)));
+}
 
 void xostream::ChangeIndent(int by) {
   TakeRoom();
