@@ -18,8 +18,7 @@ namespace vesk {
 // not here, but in GraphState.
 class DGNode : private DGQueuePlace, private DGChangePlace {
  public:
-  explicit DGNode(int flags = 0)
-      : m_flags(flags), m_state(flags & DF_SOURCE ? ENodeState::Clean : ENodeState::Hard) {}
+  explicit DGNode(int flags = 0) : m_flags(flags), m_state(flags & DF_SOURCE ? ENodeState::Clean : ENodeState::Hard) {}
   // A copy of an object calculates for itself; an assigned one has changed.
   DGNode(DGNode const& rhs) : DGNode(rhs.m_flags) {}
   DGNode& operator=(DGNode const&) {

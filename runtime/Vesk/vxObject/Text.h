@@ -17,10 +17,10 @@ template <typename C>
 class basic_xstring : public std::basic_string<C> {
  public:
   typedef std::basic_string<C> base;
-  using typename base::const_iterator;
-  using typename base::iterator;
   using base::base;
   using base::insert;
+  using typename base::const_iterator;
+  using typename base::iterator;
   basic_xstring() {}
   basic_xstring(base const& text) : base(text) {}
   basic_xstring(base&& text) : base(std::move(text)) {}

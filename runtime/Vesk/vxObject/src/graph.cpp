@@ -1,5 +1,5 @@
-// The dependency graph and the fields of models. The parts are one source, as what they share takes the compiler longer than
-// they do.
+// The dependency graph and the fields of models. The parts are one source, as what they share takes the compiler longer
+// than they do.
 
 @import "Vesk/vxObject/src/parts/graph.h"
 @import "Vesk/vxObject/src/parts/calculations.h"

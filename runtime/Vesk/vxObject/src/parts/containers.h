@@ -189,7 +189,9 @@ struct NewDeque {
   ~NewDeque() { m_view.Free(m_size); }
   NewDeque(NewDeque const&) = delete;
   void operator=(NewDeque const&) = delete;
-  void Replace(void* deque) { static_cast<std::deque<octet_t>*>(deque)->swap(*static_cast<std::deque<octet_t>*>(At())); }
+  void Replace(void* deque) {
+    static_cast<std::deque<octet_t>*>(deque)->swap(*static_cast<std::deque<octet_t>*>(At()));
+  }
   void* At() { return &m_view; }
 
   std::size_t m_size;
@@ -383,8 +385,8 @@ void ResizeList(ValueType const& type, void* container, ssize_t count) {
 
 void* InsertEntry(ValueType const& type, void* container, ValueFunction const& fill) {
   const Work work(type, &fill);
-  StandIn const* const entry = type.m_code == RC_BAG ? static_cast<BagView*>(container)->Make()
-                                                     : static_cast<SetView*>(container)->Make();
+  StandIn const* const entry =
+      type.m_code == RC_BAG ? static_cast<BagView*>(container)->Make() : static_cast<SetView*>(container)->Make();
   return entry ? entry->At(work.m_shift) : nullptr;
 }
 

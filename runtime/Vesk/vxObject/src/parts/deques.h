@@ -58,7 +58,8 @@ class DequeView {
   static std::size_t PerBlock(std::size_t size) { return std::__deque_buf_size(size); }
   static octet_t* NewBlock(std::size_t size) { return std::allocator<octet_t>().allocate(PerBlock(size) * size); }
   void FreeUpTo(octet_t** end, std::size_t size) {
-    for (octet_t** at = m_begin.m_block; at < end; ++at) std::allocator<octet_t>().deallocate(*at, PerBlock(size) * size);
+    for (octet_t** at = m_begin.m_block; at < end; ++at)
+      std::allocator<octet_t>().deallocate(*at, PerBlock(size) * size);
     std::allocator<octet_t*>().deallocate(m_map, m_mapSize);
   }
 
@@ -85,7 +86,9 @@ struct DequeOf {
 class DequeView {
  public:
   static DequeView& Of(void const* deque) { return *static_cast<DequeView*>(const_cast<void*>(deque)); }
-  static bool IsSize(std::size_t size) { return size == 1 || size == 2 || (size > 0 && size <= Most && size % Step == 0); }
+  static bool IsSize(std::size_t size) {
+    return size == 1 || size == 2 || (size > 0 && size <= Most && size % Step == 0);
+  }
 
   DequeView(std::size_t size, std::size_t count) { FunctionsOf(size).m_make(m_deque, count); }
   void Free(std::size_t size) { FunctionsOf(size).m_free(m_deque); }

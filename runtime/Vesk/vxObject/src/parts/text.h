@@ -38,7 +38,8 @@ inline void xostream::WriteShortest(T value) {
     return;
   }
   char text[MostDigits];
-  WriteLines(std::string_view(text, static_cast<std::size_t>(std::to_chars(text, text + MostDigits, value).ptr - text)));
+  WriteLines(
+      std::string_view(text, static_cast<std::size_t>(std::to_chars(text, text + MostDigits, value).ptr - text)));
 }
 void xostream::WriteNumber(int value) { WriteShortest(value); }
 void xostream::WriteNumber(unsigned value) { WriteShortest(value); }
