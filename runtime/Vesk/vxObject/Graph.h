@@ -86,16 +86,6 @@ inline void GraphState::Change(DGNode const& node) {
   if (!node.m_dependents.empty()) TellDependents(node);
 }
 
-inline Calculation::Calculation(GraphState& state, DGNode const* node)
-    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
-  if (node) node->m_isCalculating = true;
-}
-inline Calculation::~Calculation() {
-  if (m_node) m_node->m_isCalculating = false;
-  m_state.m_calculation = m_outer;
-  if (m_inputs) DropInputs();
-}
-
 // The node of a `$dep` field.
 class DGDepNode : public DGNode {
  public:

@@ -184,7 +184,6 @@ struct Calculation {
  private:
   struct InputSet;
   bool LookWhetherItOwns(void const* address);
-  void DropInputs();
 
   InputSet* m_inputs = nullptr;  // once there are many
   ValuePlace m_place;

@@ -176,7 +176,15 @@ void GraphState::EndOfRest() {
 
 struct Calculation::InputSet : std::unordered_set<DGNode const*> {};
 
-void Calculation::DropInputs() { delete m_inputs; }
+Calculation::Calculation(GraphState& state, DGNode const* node)
+    : m_node(node), m_state(state), m_outer(std::exchange(state.m_calculation, this)) {
+  if (node) node->m_isCalculating = true;
+}
+Calculation::~Calculation() {
+  if (m_node) m_node->m_isCalculating = false;
+  m_state.m_calculation = m_outer;
+  delete m_inputs;
+}
 
 void Calculation::Forget(DGNode const* node, DGNode const* input) {
   for (Calculation* at = this; at; at = at->m_outer) {
