@@ -1,6 +1,7 @@
 """Workspaces of many projects and files, with the same build described for the peers."""
 
 import os
+import subprocess
 
 from workloads import write
 
@@ -122,12 +123,59 @@ object=${text##*-o \\"}
 """
 
 
+def add_tools(root, text):
+    for name in ("gcc-4", "ar"):
+        write(f"{root}/tools/{name}", text)
+        os.chmod(f"{root}/tools/{name}", 0o755)
+
+
+# Makes the object that the last `-o "..."` of its response file names, empty. A program: 300 shells would be measured.
+SLEEPING = r"""#include <stdio.h>
+#include <string.h>
+#include <time.h>
+int main(int count, char** words) {
+  char text[4096];
+  FILE* file = fopen(words[count - 1] + 1, "r");
+  if (!file) return 2;
+  text[fread(text, 1, sizeof text - 1, file)] = 0;
+  char* object = text;
+  for (char* next = text; (next = strstr(next, "-o \""));) object = next += 4;
+  *strchr(object, '"') = 0;
+  if (!fopen(object, "w")) return 2;
+  struct timespec tenth = {0, 100000000};
+  return nanosleep(&tenth, 0);
+}
+"""
+
+
+def sleeping_build(root, files):
+    """A build whose compiler sleeps: `Qrex main.qrex jobs=N` in root."""
+    workspace(root, "build", 1, files)
+    add_tools(root, TOOL)
+    write(f"{root}/sleeping.c", SLEEPING)
+    subprocess.run(["gcc", "-O1", "-o", f"{root}/tools/gcc-4", f"{root}/sleeping.c"], check=True)
+
+
+def compiled(root, files):
+    """A build by g++, with standard headers in each source: `Qrex main.qrex jobs=2`, and `ninja -j2` of the same commands."""
+    [names] = workspace(root, "build", 1, files)
+    write(f"{root}/tree/p0/p0.h", "#include <map>\n#include <string>\nint p0();\n")
+    options = "-g -Wall -Itree/p0 -Itree/p0/src -Itree"
+    ninja = [f"rule compile\n  command = g++ -c {options} $in -o $out\nrule archive\n  command = ar rcs $out $in\n"]
+    for name in names:
+        path = f"tree/p0/src/{name}"
+        text = f'@import "p0/p0.h"\nstd::map<std::string, int> of_{name[:-4]}() {{ return {{{{"a", 1}}}}; }}\n'
+        write(f"{root}/{path}", text)
+        write(f"{root}/plain/{path}", text.replace("@import", "#include"))
+        ninja.append(f"build ninja/{name}.o: compile plain/{path}\n")
+    ninja.append(f"build ninja/p0.a: archive {' '.join(f'ninja/{name}.o' for name in names)}\n")
+    write(f"{root}/build.ninja", "".join(ninja))
+
+
 def build(root, projects, files):
     """A build whose tools cost nothing: `Qrex main.qrex`, `ninja` and `make -rR` in root."""
     sources = workspace(root, "build", projects, files)
-    for name in ("gcc-4", "ar"):
-        write(f"{root}/tools/{name}", TOOL)
-        os.chmod(f"{root}/tools/{name}", 0o755)
+    add_tools(root, TOOL)
     ninja, make, targets = ["rule make\n  command = : > $out\n"], [], []
     for number, names in enumerate(sources):
         objects = [f"p{number}/{name}.o" for name in names]

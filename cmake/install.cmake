@@ -12,6 +12,24 @@ install(FILES ${manual}/Qrex.bash DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-comp
 install(FILES ${manual}/_Qrex DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions COMPONENT tool)
 install(DIRECTORY runtime DESTINATION ${CMAKE_INSTALL_DATADIR}/qrex COMPONENT runtime)
 
+# What other people's builds find: as installed, wherever that is moved, and in the build folder. There the runtime is
+# made of its sources, as the tool itself takes it there.
+include(CMakePackageConfigHelpers)
+set(package lib/cmake/Qrex)
+set(QREX_PACKAGE_MODULES "\${_qrex_here}")
+set(QREX_PACKAGE_PROGRAM "\${_qrex_here}/../../../${CMAKE_INSTALL_BINDIR}/Qrex")
+set(QREX_PACKAGE_LIBRARY "\${_qrex_here}/../../qrex")
+set(QREX_PACKAGE_SOURCES "\${_qrex_here}/../../../${CMAKE_INSTALL_DATADIR}/qrex/runtime")
+configure_file(cmake/QrexConfig.cmake.in ${CMAKE_BINARY_DIR}/package/QrexConfig.cmake @ONLY)
+write_basic_package_version_file(${CMAKE_BINARY_DIR}/QrexConfigVersion.cmake COMPATIBILITY SameMajorVersion)
+install(FILES ${CMAKE_BINARY_DIR}/package/QrexConfig.cmake ${CMAKE_BINARY_DIR}/QrexConfigVersion.cmake cmake/QrexTranslate.cmake
+        cmake/QrexRuntime.cmake cmake/QrexRun.cmake DESTINATION ${package} COMPONENT tool)
+set(QREX_PACKAGE_MODULES ${CMAKE_SOURCE_DIR}/cmake)
+set(QREX_PACKAGE_PROGRAM ${CMAKE_BINARY_DIR}/Qrex)
+set(QREX_PACKAGE_LIBRARY "")
+set(QREX_PACKAGE_SOURCES ${CMAKE_SOURCE_DIR}/runtime)
+configure_file(cmake/QrexConfig.cmake.in ${CMAKE_BINARY_DIR}/QrexConfig.cmake @ONLY)
+
 include(cmake/built_runtime.cmake)
 
 set(CPACK_PACKAGE_NAME qrex)

@@ -85,12 +85,17 @@ struct World {
     return loaded;
   }
   Project& App() { return *workspace->projects.front(); }
-  void StartBuild() { builder = std::make_unique<ProjectBuilder>(settings, App(), *App().configs.front()); }
+  void StartBuild() {
+    builder.reset();
+    scheduler = std::make_unique<Scheduler>(settings);
+    builder = std::make_unique<ProjectBuilder>(settings, App(), *App().configs.front(), *scheduler);
+  }
   ScannedFile& Scanned(const std::string& path) { return builder->GetScannedFile(*builder->FindFile(path)); }
 
   ConfigSettings settings;
   std::string configs = "\"Debug|x64\"";  // of the projects that are written
   std::unique_ptr<Workspace> workspace;
+  std::unique_ptr<Scheduler> scheduler;
   std::unique_ptr<ProjectBuilder> builder;  // of the first project
 };
 

@@ -2,6 +2,9 @@
 
 #include <algorithm>
 
+#include "builder/build_observer.h"
+#include "translator/file/translate_file.h"
+
 namespace qrex {
 
 BuildFiles::BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig& config)
@@ -54,6 +57,37 @@ bool BuildFiles::FindSourcePlace(const char* position, SourcePlace& place) const
 void BuildFiles::Tell(const Message& message) {
   if (message.severity == Severity::Warning && message.code != 0) ++warningCount;
   settings.Tell(message);
+}
+
+Message ErrorOf(const IException& exception) {
+  const auto* const parseError = dynamic_cast<const LexScannerException*>(&exception);
+  if (!parseError) return Message(Severity::Error, "Error: ", ExceptionText(exception));
+  return Message(Severity::Error, "error : ", parseError->message)
+      .At({parseError->file, parseError->line, parseError->begin, parseError->end})
+      .WithHint(parseError->hint)
+      .Apart();
+}
+
+// A file that several projects read has its error told by the first of them; each that imports it is named by its own.
+void BuildFiles::TellFault(const ScannedFile& file, const IException& exception) {
+  if (!settings.faulty.insert(file.SourcePath()).second) return;
+  Message message = ErrorOf(exception);
+  if (dynamic_cast<const FaultyFileException*>(&exception)) {
+    message.severity = Severity::Note;
+    message.label = "note : ";
+    message.isApart = false;
+  } else {
+    ++errorCount;
+  }
+  settings.Tell(message);
+}
+
+void BuildFiles::TranslationBegins(const ScannedFile& file) {
+  if (settings.observer) settings.observer->TranslationBegins(file);
+}
+
+void BuildFiles::TranslationEnds(const ScannedFile& file) {
+  if (settings.observer) settings.observer->TranslationEnds(file);
 }
 
 void BuildFiles::TakenBack(ScannedFile& file) {

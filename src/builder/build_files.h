@@ -16,6 +16,9 @@
 
 namespace qrex {
 
+// Of an error that ended a translation, or a run.
+Message ErrorOf(const IException& exception);
+
 class BuildFiles : public TranslationHost {
  public:
   BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig& config);
@@ -35,7 +38,10 @@ class BuildFiles : public TranslationHost {
   size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
   std::vector<const ScannedFile*> FilesOfProject() const override;
   void Tell(const Message& message) override;
+  void TellFault(const ScannedFile& file, const IException& exception) override;
   void TakenBack(ScannedFile& file) override;
+  void TranslationBegins(const ScannedFile& file) override;
+  void TranslationEnds(const ScannedFile& file) override;
   bool FindSourcePlace(const char* position, SourcePlace& place) const override;
 
   ConfigSettings& settings;
@@ -53,7 +59,7 @@ class BuildFiles : public TranslationHost {
   std::unordered_map<std::string_view, std::unique_ptr<ScannedFile>> scannedByPath;
   FileTimes times;
   bool dependencyFileLoaded = false;
-  int64_t warningCount = 0;
+  int64_t warningCount = 0, errorCount = 0;
 
  private:
   const ScannedFile* FileOfPosition(const char* position) const;  // whose source text holds it; or null

@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "builder/build_observer.h"
 #include "builder/run_command.h"
 
 namespace qrex {
@@ -18,6 +19,7 @@ class BuildStep {
   // Tells of the next command and leaves ready what it needs. None: the step is over.
   virtual std::optional<Command> Prepare() = 0;
   virtual void Finish(const CommandResult& result) = 0;  // of that command
+  virtual ToolTask Task() const { return {}; }           // of that command
   // Once it is over. A step that failed has said why and counted an error, and nothing half made is left of it.
   bool HasSucceeded() const { return m_hasSucceeded; }
 

@@ -216,6 +216,11 @@ class LinkStep : public BuildStep {
     return std::nullopt;
   }
 
+  ToolTask Task() const override {
+    const ToolKind kind = m_stage == Stage::Link ? ToolKind::Linker : ToolKind::ManifestTool;
+    return {kind, m_builder.project.name, {}, m_target, m_inputs};
+  }
+
   void Finish(const CommandResult& result) override {
     m_commandFile.reset();
     if (!result.succeeded) {

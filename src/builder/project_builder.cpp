@@ -4,6 +4,7 @@
 #include <utility>
 
 #include "builder/dependency_file.h"
+#include "builder/make_reason.h"
 #include "builder/reflection_tails.h"
 #include "builder/staleness.h"
 #include "builder/tools.h"
@@ -16,33 +17,40 @@
 
 namespace qrex {
 
-// Compilers that write into one file of debug information, or read a precompiled header that another source makes, run
-// one after the other.
-size_t ProjectBuilder::SlotCount(const ConfigSettings& settings) {
-  if (!IsGccFamily(settings.compiler)) return 1;
-  return settings.jobs == 0 ? platform::ProcessorCount() : static_cast<size_t>(settings.jobs);
-}
-
 void ProjectBuilder::WriteHeading(std::string_view end) const {
   TraceWriter() << "\n------------------------------------- " << project.name << "  [" << config.name << "|"
                 << config.platform << "] ------------------------------------------" << end;
 }
 
 bool ProjectBuilder::Build(const std::string& dependencyFile, const ProjectFile* singleFile) {
+  bool hasSucceeded = false;
+  Begin(dependencyFile, singleFile, [&](bool succeeded) { hasSucceeded = succeeded; });
+  try {
+    scheduler.WaitForAll();
+  } catch (const IException&) {
+    Save();
+    throw;
+  }
+  return hasSucceeded;
+}
+
+void ProjectBuilder::Begin(const std::string& dependencyFile, const ProjectFile* singleFile,
+                           std::function<void(bool)> whenOver) {
+  m_dependencyFile = dependencyFile;
   if (!settings.translateOnly && settings.Environment()) ApplyEnvironment(*settings.Environment());
   // What these print is searched for words.
   if (RunsTools() && IsGccFamily(settings.compiler)) platform::SetEnvironment("LC_ALL", "C");
   WriteHeading("\n");
   if (project.exported) TraceWriter() << "[prepackaged - only processing headers]\n";
   PrepareFiles(dependencyFile);
+  if (settings.observer) settings.observer->ProjectBegins(project.name, ExpectedSteps());
   try {
     RunSteps(singleFile);
+    AddLastStep(std::move(whenOver));
   } catch (const IException&) {
-    Save(dependencyFile);
+    Save();
     throw;
   }
-  Save(dependencyFile);
-  return !m_hasFailed;
 }
 
 void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
@@ -52,12 +60,23 @@ void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
     scheduler.WaitForAll();  // what was begun ahead of the error is finished
     throw;
   }
-  scheduler.WaitForAll();
-  if (!project.exported && settings.mode == RunMode::Build) {
-    ReportUnregistered();
-    if (!settings.translateOnly && !m_hasFailed) LinkIfStale();
-  }
-  scheduler.WaitForAll();
+}
+
+void ProjectBuilder::AddLastStep(std::function<void(bool)> whenOver) {
+  auto link = [this]() -> std::unique_ptr<BuildStep> {
+    if (project.exported || settings.mode != RunMode::Build) return nullptr;
+    if (!m_hasFaultyFiles) ReportUnregistered();
+    if (settings.translateOnly || m_hasFailed) return nullptr;
+    if (const Project* const library = UnmadeLibrary()) return ReportUnlinked(*library);
+    return LinkIfStale();
+  };
+  scheduler.AddBehind(link, [this, whenOver = std::move(whenOver)](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    if (succeeded && !m_linked.empty()) settings.made.insert(m_linked);
+    if (m_hasFailed) settings.unmade.insert(&project);
+    Save();
+    whenOver(!m_hasFailed);
+  });
 }
 
 void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
@@ -75,6 +94,7 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
     file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
+    if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
   if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, knownFiles);
@@ -102,16 +122,33 @@ void ProjectBuilder::ReadTimes() {
   for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
 }
 
+// A little more or less comes of what is met on the way.
+size_t ProjectBuilder::ExpectedSteps() const {
+  size_t count = 0;
+  for (const ScannedFile* file : scanned) {
+    bool isMade = file->needsWriting;
+    if (RunsTools() && HasObject(file->file) && !isMade) {
+      const auto object = m_objects.find(paths.Object(file->file));
+      isMade = object == m_objects.end() || object->second.time <= file->times.target;
+    }
+    if (isMade && (!RunsTools() || HasObject(file->file))) ++count;
+  }
+  return count > 0 && RunsTools() && settings.mode == RunMode::Build ? count + 1 : count;
+}
+
 void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFile) {
   const FileKind kind = file.file.kind;
   const bool isBuild = settings.mode == RunMode::Build;
   const bool isWanted = isBuild || &file.file == singleFile;
   const bool isWritten = isWanted && !project.exported;
-  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file);
+  if (file.file.isMainSource && RegistriesMoved()) WriteAgain(file, MakeReason::Cause::OthersRegister);
   if (kind == FileKind::Cpp && isWritten && m_hasStaleFiles && !file.needsWriting && !file.HasBegunInPass()) {
-    if (TailsMoved(file)) WriteAgain(file);
+    if (TailsMoved(file)) WriteAgain(file, MakeReason::Cause::RecordsMove);
   }
-  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten)) BringUpToDate(file);
+  if (file.file.isMainSource && m_hasFaultyFiles && file.needsWriting && isWritten) {
+    return LearnNames(file);  // it would lack what those register
+  }
+  if ((file.needsWriting || file.isKept) && (kind == FileKind::H || isWritten) && !Translate(file)) return;
   if (kind == FileKind::Cpp && singleFile && singleFile->isMainSource && file.times.translation == 0) LearnNames(file);
   if (RunsTools() && isBuild && CompilerOf(settings.compiler).compilesResources && kind == FileKind::Rc) {
     CompileResourceIfStale(file);
@@ -120,11 +157,21 @@ void ProjectBuilder::ProcessFile(ScannedFile& file, const ProjectFile* singleFil
   if (kind == FileKind::Cpp && !file.HasBegunInPass()) MarkRegistered(file);
 }
 
+bool ProjectBuilder::Translate(ScannedFile& file) {
+  try {
+    BringUpToDate(file);
+    return true;
+  } catch (const FaultyFileException&) {
+    m_hasFailed = m_hasFaultyFiles = true;
+    return false;
+  }
+}
+
 // What no run has translated registers something or not: the main source, which is to be compiled alone, has to know.
 // The file stays stale.
 void ProjectBuilder::LearnNames(ScannedFile& file) {
   const bool needsWriting = std::exchange(file.needsWriting, false);
-  BringUpToDate(file);
+  Translate(file);
   file.needsWriting = needsWriting;
 }
 
@@ -142,7 +189,8 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
   if (isNew) object.time = times.LastWriteTime(path);
   if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
-  BringUpToDate(file);
+  if (settings.observer) settings.observer->IsStale(path, WhyCompiled(*this, file, object.time));
+  if (!Translate(file)) return;
   scheduler.Add(ObjectStep(*this, file), [this, path, &object](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
     object.time = times.LastWriteTime(path);
@@ -181,8 +229,34 @@ void ProjectBuilder::ReportUnregistered() const {
   }
 }
 
-void ProjectBuilder::LinkIfStale() {
-  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return;  // no target
+// In a run that keeps going: the first of those that the target is linked with which could not be made. A static
+// library leaves them to its users.
+const Project* ProjectBuilder::UnmadeLibrary() const {
+  if (!settings.keepGoing || settings.unmade.empty() || project.targetType == TargetType::StaticLibrary) return nullptr;
+  std::vector<const Project*> open{&project};
+  std::unordered_set<const Project*> seen{&project};
+  while (!open.empty()) {
+    const Project* const user = open.back();
+    open.pop_back();
+    for (const std::string& path : user->subprojects) {
+      const Project* const used = project.workspace->FindSubproject(path);
+      if (!used || !IsLibrary(used->targetType) || !seen.insert(used).second) continue;
+      if (settings.unmade.contains(used)) return used;
+      if (used->targetType == TargetType::StaticLibrary) open.push_back(used);
+    }
+  }
+  return nullptr;
+}
+
+// The error is that of the library.
+std::unique_ptr<BuildStep> ProjectBuilder::ReportUnlinked(const Project& library) {
+  TraceWriter() << project.name << " is not linked: " << library.name << " could not be made\n";
+  m_hasFailed = true;
+  return nullptr;
+}
+
+std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
+  if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
   const int64_t targetTime = LastWriteTime(target);
@@ -196,23 +270,28 @@ void ProjectBuilder::LinkIfStale() {
     const int64_t time = timeOf(input);
     return time > targetTime || (time == targetTime && settings.made.contains(input));
   };
-  const bool isCurrent = targetTime != 0 && std::none_of(watched.begin(), watched.end(), isLater);
-  if (isCurrent && !LiesAhead(*this, targetTime)) return;
-  scheduler.Add(TargetStep(*this, target, inputs), [this, target](bool succeeded) {
-    m_hasFailed = m_hasFailed || !succeeded;
-    if (succeeded) settings.made.insert(target);
-  });
+  const auto later = targetTime == 0 ? watched.end() : std::find_if(watched.begin(), watched.end(), isLater);
+  if (targetTime != 0 && later == watched.end() && !LiesAhead(*this, targetTime)) return nullptr;
+  if (settings.observer) {
+    using Cause = MakeReason::Cause;
+    const Cause cause = targetTime == 0 ? Cause::Missing : later == watched.end() ? Cause::Ahead : Cause::Changed;
+    settings.observer->IsStale(
+        target, {cause, cause == Cause::Changed ? *later : "", cause == Cause::Changed ? timeOf(*later) : 0});
+  }
+  m_linked = target;
+  return TargetStep(*this, target, inputs);
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
-void ProjectBuilder::Save(const std::string& dependencyFile) {
+void ProjectBuilder::Save() {
   if (registerMap.dirty || unregisterMap.dirty) {
     for (ScannedFile* file : scanned) {
       if (file->file.isMainSource && (!file->HasBegun() || file->needsWriting)) file->times.translation = 0;
     }
   }
   if (m_hasStaleFiles) ForgetUnsettledTails(*this);
-  SaveDependencyFile(*this, dependencyFile);
+  SaveDependencyFile(*this, m_dependencyFile);
+  if (settings.observer) settings.observer->ProjectEnds(*this);
 }
 
 void ProjectBuilder::Clean(const std::string& dependencyFile) {
@@ -227,27 +306,34 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
 
 namespace {
 
-void ExportFolder(Project& project, const ProjectConfig& config, const ProjectFolder& folder) {
-  const ConfigSettings& settings = *project.settings;
-  const bool readOnly = settings.makeExportedHeaderFilesReadOnly;
+void AddPublicFiles(const ProjectFolder& folder, std::vector<const ProjectFile*>& files) {
   for (const ProjectFile* file : folder.files) {
-    if (file->excluded) continue;
-    const std::string source = project.SourcePath(*file);
-    const std::string translated = project.usesQrex ? PathJoin(TranslationDirectory(config), file->path) : source;
-    CopyIfNewer(settings.leftovers, translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
-    CopyIfNewer(settings.leftovers, source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
+    if (!file->excluded) files.push_back(file);
   }
   for (const auto& subfolder : folder.subfolders) {
-    if (&folder == &project.rootFolder && subfolder->name == "src") continue;
-    ExportFolder(project, config, *subfolder);
+    if (&folder == &folder.project->rootFolder && subfolder->name == "src") continue;
+    AddPublicFiles(*subfolder, files);
   }
 }
 
 }  // namespace
 
-void ExportPublicHeaders(Project& project, ProjectConfig& config) {
+std::vector<const ProjectFile*> PublicFiles(Project& project) {
   project.CollectFiles();
-  ExportFolder(project, config, project.rootFolder);
+  std::vector<const ProjectFile*> files;
+  AddPublicFiles(project.rootFolder, files);
+  return files;
+}
+
+void ExportPublicHeaders(Project& project, ProjectConfig& config) {
+  const ConfigSettings& settings = *project.settings;
+  const bool readOnly = settings.makeExportedHeaderFilesReadOnly;
+  for (const ProjectFile* file : PublicFiles(project)) {
+    const std::string source = project.SourcePath(*file);
+    const std::string translated = project.usesQrex ? PathJoin(TranslationDirectory(config), file->path) : source;
+    CopyIfNewer(settings.leftovers, translated, settings.exportTranslatedInclude + "/" + file->path, readOnly);
+    CopyIfNewer(settings.leftovers, source, settings.exportUntranslatedInclude + "/" + file->path, readOnly);
+  }
 }
 
 }  // namespace qrex

@@ -14,19 +14,23 @@ namespace qrex {
 
 class ProjectBuilder : public BuildFiles {
  public:
-  using BuildFiles::BuildFiles;
+  ProjectBuilder(ConfigSettings& givenSettings, Project& givenProject, ProjectConfig& givenConfig,
+                 Scheduler& givenScheduler)
+      : BuildFiles(givenSettings, givenProject, givenConfig), scheduler(givenScheduler) {}
 
-  // With a single file only that file is compiled, and resources and the link are left out. False when a step failed.
-  // An exception of the translation goes on to the caller; what was finished before it is kept.
-  bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);
+  // Translates, and has the scheduler compile and link. `whenOver` is told, behind all steps, whether they succeeded;
+  // until then the builder must live. With a single file only that file is compiled, and resources and the link are
+  // left out. An exception of the translation goes on to the caller; what was finished before it is kept.
+  void Begin(const std::string& dependencyFile, const ProjectFile* singleFile, std::function<void(bool)> whenOver);
+  bool Build(const std::string& dependencyFile, const ProjectFile* singleFile);  // to the end
+  void Save();  // the dependency file; for a builder that comes to no end, what is known so far
   // Behind a Build: translates again what follows from these files, whose texts have changed since, and no other. What
   // they and all that import them had declared is taken back. A pass that ends early, by an exception, is made good by
   // the next one.
   void TranslateAgain(const std::vector<ProjectFile*>& changed);
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
-  int64_t errorCount = 0;
-  Scheduler scheduler{settings.tools, SlotCount(settings), settings.jobServer.get()};
+  Scheduler& scheduler;
 
  private:
   struct Object {
@@ -34,29 +38,37 @@ class ProjectBuilder : public BuildFiles {
     const ProjectFile* source = nullptr;
   };
 
-  static size_t SlotCount(const ConfigSettings& settings);
   void WriteHeading(std::string_view end) const;
   void RunSteps(const ProjectFile* singleFile);
+  void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
+  size_t ExpectedSteps() const;
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
+  bool Translate(ScannedFile& file);  // false: it failed, and the run goes on
+  const Project* UnmadeLibrary() const;
   void ProcessFile(ScannedFile& file, const ProjectFile* singleFile);
   void BeginPass(const std::vector<ProjectFile*>& changed);
-  bool RegistriesMoved();              // asked for the main source, behind all that could settle them
-  void WriteAgain(ScannedFile& file);  // though it was translated in an earlier pass
+  bool RegistriesMoved();  // asked for the main source, behind all that could settle them
+  void WriteAgain(ScannedFile& file, MakeReason::Cause why);  // though it was translated in an earlier pass
   void LearnNames(ScannedFile& file);
   void CompileResourceIfStale(ScannedFile& file);
   void CompileIfStale(ScannedFile& file);
   void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
-  void LinkIfStale();
-  void Save(const std::string& dependencyFile);
+  std::unique_ptr<BuildStep> LinkIfStale();
+  std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 
+  std::string m_dependencyFile;
+  std::string m_linked;                               // the target, while it is
   std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
   bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
   bool m_hasFailed = false;                           // a step has
+  bool m_hasFaultyFiles = false;
 };
 
+// What is outside the project's `src` folder.
+std::vector<const ProjectFile*> PublicFiles(Project& project);
 // Copies what is outside the project's `src` folder to the export directories, translated and as it is.
 void ExportPublicHeaders(Project& project, ProjectConfig& config);
 

@@ -41,6 +41,7 @@ void ReportNoInterpreter(platform::ProcessEnd::StartFailure failure) {
 std::string_view ToolOf(std::string_view command) {
   constexpr std::string_view kInterpreter = "cmd /c ";
   if (command.substr(0, kInterpreter.size()) == kInterpreter) command.remove_prefix(kInterpreter.size());
+  if (command.starts_with('"')) return command.substr(1, command.find('"', 1) - 1);
   return command.substr(0, command.find(' '));
 }
 
@@ -82,10 +83,12 @@ platform::Processes::Id StartCommand(platform::Processes& tools, const Command& 
   if (command.capturesOutput) DeleteThoughReadOnly(kOutputFile);
   if (command.capturesErrors) DeleteThoughReadOnly(kErrorFile);
   if (command.echo) TraceWriter() << LineOf(command) << "\n";
-  return tools.Start({.line = command.line,
-                      .output = command.capturesOutput ? Stream::Captured : Stream::Inherited,
+  const bool isShownBehind = command.showsOutputBehind;
+  return tools.Start({.words = command.words,
+                      .line = command.line,
+                      .output = command.capturesOutput || isShownBehind ? Stream::Captured : Stream::Inherited,
                       .errors = command.capturesErrors ? Stream::Captured : Stream::Inherited,
-                      .errorsIntoOutput = command.errorsIntoOutput});
+                      .errorsIntoOutput = command.errorsIntoOutput || isShownBehind});
 }
 
 CommandResult EndCommand(const Command& command, platform::Processes::Ended ended) {
@@ -97,6 +100,7 @@ CommandResult EndCommand(const Command& command, platform::Processes::Ended ende
     return result;
   };
 
+  if (std::string shown; command.showsOutputBehind && TakeCaptured(ended.output, shown)) TraceWriter() << shown;
   if (ended.end.cause == platform::ProcessEnd::Cause::NotStarted) {
     fail("");
     ReportNoInterpreter(ended.end.failure);

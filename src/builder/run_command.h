@@ -1,4 +1,4 @@
-// Starting a tool through the command interpreter, and what is said of how it ended.
+// Starting a tool, through the command interpreter or by its words, and what is said of how it ended.
 #pragma once
 
 #include <optional>
@@ -13,10 +13,12 @@ namespace qrex {
 
 struct Command {
   std::string line;
+  std::vector<std::string> words = {};  // run without the interpreter; the line is what is told of them
   bool echo = false;
   bool capturesOutput = false;
   bool capturesErrors = false;
-  bool errorsIntoOutput = false;  // the error stream joins the captured output
+  bool errorsIntoOutput = false;   // the error stream joins the captured output
+  bool showsOutputBehind = false;  // what is not captured is printed once the tool has ended
   bool failOnNonZero = false;
   bool failOnErrorText = false;
 };

@@ -9,15 +9,12 @@
 #include <string>
 
 #include "builder/build_step.h"
-#include "platform/job_server.h"
 
 namespace qrex {
 
 class Scheduler {
  public:
-  // `jobServer`: null where there is none.
-  Scheduler(platform::Processes& tools, size_t slots, platform::JobServer* jobServer = nullptr)
-      : m_tools(tools), m_slots(slots), m_jobServer(jobServer) {}
+  explicit Scheduler(const ConfigSettings& settings);
   ~Scheduler() { Abandon(); }
   Scheduler(const Scheduler&) = delete;
   Scheduler& operator=(const Scheduler&) = delete;
@@ -26,22 +23,33 @@ class Scheduler {
   // Begins the step, and comes back when a slot is free: if there is one slot, when the step is over. `whenOver` is
   // told whether it has succeeded. An interrupt by the user ends all steps, and goes on as the exception of EndCommand.
   void Add(std::unique_ptr<BuildStep> step, std::function<void(bool)> whenOver);
+  // As a step that is not made before all those ahead of it are over; it may turn out to be none.
+  void AddBehind(std::function<std::unique_ptr<BuildStep>()> make, std::function<void(bool)> whenOver);
   void WaitForAll();
   void Abandon();  // ends the tools; the steps have failed, and are not told
+  // What the work writes to the trace log, for later.
+  std::string TextOf(const std::function<void()>& work);
 
  private:
+  static constexpr platform::Processes::Id kNone = ~platform::Processes::Id{0};
   struct Begun {
+    std::function<std::unique_ptr<BuildStep>()> make;  // until it is made
     std::unique_ptr<BuildStep> step;
     std::function<void(bool)> whenOver;
     Command command;
-    platform::Processes::Id id = 0;
+    platform::Processes::Id id = kNone;  // of the last command
     std::optional<platform::Processes::Ended> ended;
     bool isOver = false;
     std::string textBehind;  // of the trace log, written since it began
+
+    bool IsRunning() const { return !make && !isOver && !ended; }
   };
 
+  void Queue(Begun begun);
   void RunNext(Begun& begun);
+  bool MakeStep(Begun& begun);  // false: it has to wait for a slot
   void AwaitToken();
+  std::optional<platform::Processes::Ended> WaitForTool(int milliseconds);
   bool WaitForOne(int milliseconds = platform::Processes::kForever);  // false: none has ended in that time
   void HoldTraceBehind();
   void FinishInOrder();
@@ -50,7 +58,8 @@ class Scheduler {
   platform::Processes& m_tools;
   const size_t m_slots;
   platform::JobServer* const m_jobServer;
-  std::deque<Begun> m_begun;  // in the order of their addition; the first is not over yet
+  BuildObserver* const& m_observer;  // of the settings
+  std::deque<Begun> m_begun;         // in the order of their addition; the first is not over yet
 };
 
 }  // namespace qrex

@@ -1,6 +1,10 @@
 #include "builder/source_command.h"
 
+#include <algorithm>
+
 #include "builder/tool_names.h"
+#include "platform/interpreter.h"
+#include "text/paths.h"
 #include "text/text_writer.h"
 #include "workspace/switch_blocks.h"
 
@@ -39,7 +43,40 @@ std::string CompilerText(const Project& project, const ProjectConfig& config, co
   return text.TakeText();
 }
 
+// Launchers that have what stands in a response file compiled, and do nothing else for it.
+constexpr std::string_view kReadNoResponseFiles[] = {"sccache"};
+
+bool ReadsResponseFiles(const std::vector<std::string>& launcher) {
+  if (launcher.empty()) return true;
+  const std::string_view name = FileNameOf(launcher.front());
+  return std::find(std::begin(kReadNoResponseFiles), std::end(kReadNoResponseFiles), name) ==
+         std::end(kReadNoResponseFiles);
+}
+
 }  // namespace
+
+std::string SourceCommand::Program() const { return tool.substr(0, tool.find(' ')); }
+
+std::string SourceCommand::Line(const std::string& responseFile) const {
+  std::string line = "cmd /c ";
+  for (const std::string& word : launcher) {
+    const bool isPlain = !word.empty() && word.find(' ') == std::string::npos;
+    line += isPlain ? word + " " : "\"" + word + "\" ";
+  }
+  return line + tool + (responseFile.empty() ? text : " @\"" + responseFile + "\"");
+}
+
+std::vector<std::string> SourceCommand::Words(CompilerKind compiler, const std::string& responseFile) const {
+  std::vector<std::string> words = launcher;
+  for (std::string& word : ResponseWords(compiler, tool)) words.push_back(std::move(word));
+  words[launcher.size()] = platform::NameHere(words[launcher.size()]);
+  if (!responseFile.empty()) {
+    words.push_back("@" + responseFile);
+  } else {
+    for (std::string& word : ResponseWords(compiler, text)) words.push_back(std::move(word));
+  }
+  return words;
+}
 
 SourceCommand SourceCommandOf(const Project& project, const ProjectConfig& config, const ProjectFile& file) {
   const BuildPaths paths(project, config);
@@ -51,7 +88,10 @@ SourceCommand SourceCommandOf(const Project& project, const ProjectConfig& confi
     command.input = paths.Translated(file);
     command.text = " /Fo\"" + paths.Intermediate() + "/\" \"" + command.input + "\"";
   } else {
-    command.tool = CompilerOf(project.settings->compiler).compile;
+    const ConfigSettings& settings = *project.settings;
+    command.launcher = settings.launcher;
+    command.hasFile = settings.commandFiles && ReadsResponseFiles(settings.launcher);
+    command.tool = CompilerOf(settings.compiler).compile;
     command.name = "compiler";
     command.input = paths.Compiled(file);
     command.text = CompilerText(project, config, file, paths);

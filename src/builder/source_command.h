@@ -18,10 +18,17 @@ struct CommonSwitches {
 CommonSwitches CommonSwitchesOf(const Project& project, const ProjectConfig& config);
 
 struct SourceCommand {
-  std::string tool;       // with what each of its calls is told
-  std::string_view name;  // of the tool, for its response file
-  std::string text;       // what stands behind it, on its line or in that file
+  std::vector<std::string> launcher;  // ahead of the tool
+  std::string tool;                   // with what each of its calls is told
+  std::string_view name;              // of the tool, for its response file
+  std::string text;                   // what stands behind it, on its line or in that file
   std::string input, object;
+  bool hasFile = true;  // the text stands in the file
+
+  // As it is told, and its words as they are run. An empty path: the text stands on the line.
+  std::string Line(const std::string& responseFile) const;
+  std::vector<std::string> Words(CompilerKind compiler, const std::string& responseFile) const;
+  std::string Program() const;  // the first word of the tool
 };
 std::string AssemblerOf(const ProjectConfig& config);
 // Of a source that has an object.

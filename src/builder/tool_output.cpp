@@ -1,7 +1,11 @@
 #include "builder/tool_output.h"
 
 #include <algorithm>
+#include <optional>
+#include <utility>
 
+#include "builder/build_observer.h"
+#include "builder/tool_colours.h"
 #include "text/files.h"
 #include "text/paths.h"
 
@@ -34,7 +38,7 @@ struct MessageInLine {
 
 class OutputScanner {
  public:
-  explicit OutputScanner(const BuildFiles& builder) : m_builder(builder) {
+  OutputScanner(const BuildFiles& builder, std::string_view launcher) : m_builder(builder), m_launcher(launcher) {
     FullPathOf(".", m_currentDirectory);
     if (!m_currentDirectory.ends_with('/')) m_currentDirectory += '/';
   }
@@ -42,27 +46,55 @@ class OutputScanner {
   ToolMessages Scan(std::string_view text) {
     while (!text.empty()) {
       const size_t end = std::min(text.find('\n'), text.size());
-      ScanLine(text.substr(0, end));
-      m_trace << text.substr(0, end) << (end < text.size() ? "\n" : "");
+      const std::string_view line = text.substr(0, end);
+      const std::optional<size_t> message = ScanLine(line);
+      if (m_builder.settings.coloursToolMessages) {
+        m_trace << ColouredLine(line, message);
+      } else {
+        m_trace << line;
+      }
+      if (end < text.size()) m_trace << "\n";
       text.remove_prefix(std::min(end + 1, text.size()));
     }
     return m_found;
   }
 
  private:
-  void ScanLine(std::string_view line) {
+  // Where the text of its first message begins.
+  std::optional<size_t> ScanLine(std::string_view line) {
+    std::optional<size_t> first;
     const size_t begin = line.find_first_not_of(" \t\v\f\r");
-    if (begin == std::string_view::npos) return;
+    if (begin == std::string_view::npos || IsOfLauncher(line.substr(begin))) return first;
     for (size_t at = begin; at < line.size() && StandsInFileName(line[at]);) {
       MessageInLine message;
       if (ReadMessage(line, begin, at, message)) {
-        Count(message.rest);
-        PointAtSource(line.substr(0, begin), message);
+        const bool isCounted = Count(message.rest);
+        const SourcePlace source = PointAtSource(line.substr(0, begin), message);
+        if (isCounted && m_builder.settings.observer) TellObserver(message, source);
+        if (isCounted && !first) first = static_cast<size_t>(message.rest.data() - line.data());
         at = message.end;
       } else {
         ++at;
       }
     }
+    return first;
+  }
+
+  void TellObserver(const MessageInLine& message, const SourcePlace& source) const {
+    ToolMessage told;
+    told.severity = StartsWith(message.rest, "error") ? Severity::Error : Severity::Warning;
+    told.text = message.rest;
+    told.place = {std::string(message.file), message.line};
+    if (!source.file.empty()) told.generated = std::exchange(told.place, source);
+    m_builder.settings.observer->Take(told);
+  }
+
+  // Launchers name themselves, at times with a process number: "distcc[17] ...", "ccache: ...".
+  bool IsOfLauncher(std::string_view line) const {
+    if (m_launcher.empty() || !StartsWithIgnoringCase(line, m_launcher) || line.size() == m_launcher.size())
+      return false;
+    const char behind = line[m_launcher.size()];
+    return behind == '[' || behind == ':';
   }
 
   // Is the number of a message behind the `(` or `:` at `at`?
@@ -100,34 +132,35 @@ class OutputScanner {
     return true;
   }
 
-  void Count(std::string_view rest) {
-    if (StartsWith(rest, "error")) {
-      ++m_found.errors;
-    } else if (StartsWith(rest, "warn")) {
-      ++m_found.warnings;
-    }
+  bool Count(std::string_view rest) {
+    const bool isError = StartsWith(rest, "error"), isWarning = StartsWith(rest, "warn");
+    m_found.errors += isError;
+    m_found.warnings += isWarning;
+    return isError || isWarning;
   }
 
-  void PointAtSource(std::string_view indentation, const MessageInLine& message) {
-    if (message.file.size() > kLongestPath) return;
+  SourcePlace PointAtSource(std::string_view indentation, const MessageInLine& message) {
+    if (message.file.size() > kLongestPath) return {};
     // A compiler tells how it came to a file: from here or not, with `.` and `..` as its include paths have them.
     std::string file(message.file);
     std::replace(file.begin(), file.end(), '\\', '/');
     if (!IsAbsolutePath(file)) file.insert(0, m_currentDirectory);
     file = CollapseDots(file);
     StripIgnoringCase(file, m_currentDirectory);
-    if (!StripIgnoringCase(file, TranslationDirectory(m_builder.config))) return;
+    if (!StripIgnoringCase(file, TranslationDirectory(m_builder.config))) return {};
     if (!file.empty() && file.front() == '/') file.erase(0, 1);
     auto found = m_builder.scannedByPath.find(file);
     std::string path;
     int64_t line;
     if (found == m_builder.scannedByPath.end() || !found->second->MapGeneratedLine(message.line, m_trace, path, line)) {
-      return;
+      return {};
     }
     m_trace << indentation << path << "(" << line << ") ...\n";
+    return {path, line};
   }
 
   const BuildFiles& m_builder;
+  const std::string_view m_launcher;
   std::string m_currentDirectory;  // with a slash at the end
   TraceWriter m_trace;
   ToolMessages m_found;
@@ -135,8 +168,8 @@ class OutputScanner {
 
 }  // namespace
 
-ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text) {
-  return OutputScanner(builder).Scan(text);
+ToolMessages ScanToolOutput(const BuildFiles& builder, std::string_view text, std::string_view launcher) {
+  return OutputScanner(builder, launcher).Scan(text);
 }
 
 }  // namespace qrex

@@ -8,6 +8,8 @@
 #include "builder/source_command.h"
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
+#include "platform/interpreter.h"
+#include "platform/system.h"
 #include "text/files.h"
 #include "text/output_policy.h"
 #include "text/paths.h"
@@ -42,42 +44,75 @@ class SourceStep : public BuildStep {
     if (settings.diagnostics) TraceWriter() << verb << m_file.path << "\n";
     if (!ToolsTake(m_builder, {m_command.input, m_command.object})) return std::nullopt;
     RemoveLink(m_command.object);
+    const bool hasFile = m_command.hasFile || IsTooLong();
     try {
       m_outputs.emplace(settings, std::vector{m_command.object}, std::vector{m_responseFile});
-      if (settings.diagnostics) TraceWriter() << m_responseFile << " = " << m_command.text << "\n";
-      m_response.emplace(settings.leftovers, m_responseFile, m_command.text);
+      if (hasFile) {
+        if (settings.diagnostics) TraceWriter() << m_responseFile << " = " << m_command.text << "\n";
+        m_response.emplace(settings.leftovers, m_responseFile, m_command.text);
+      }
     } catch (const FileException& exception) {
       TraceWriter() << "Error: " << exception << "\n";
       m_outputs.reset();
       CountFailure();
       return std::nullopt;
     }
-    return Command{.line = "cmd /c " + m_command.tool + " @\"" + m_responseFile + "\"",
+    const std::string file = hasFile ? m_responseFile : std::string();
+    const bool hasWords = !hasFile || HasLauncher();
+    return Command{.line = m_command.Line(file),
+                   .words = hasWords ? m_command.Words(settings.compiler, file) : std::vector<std::string>(),
                    .echo = settings.diagnostics,
                    .capturesOutput = true,
                    .errorsIntoOutput = IsGcc()};  // where that family writes its messages
   }
 
+  ToolTask Task() const override {
+    return {m_file.kind == FileKind::Asm ? ToolKind::Assembler : ToolKind::Compiler,
+            m_builder.project.name,
+            m_file.path,
+            m_command.object,
+            {m_command.input}};
+  }
+
   void Finish(const CommandResult& result) override {
+    if (!result.succeeded && m_response) TraceWriter() << m_responseFile << ": " << m_command.text << "\n";
     m_response.reset();
-    if (!result.succeeded) TraceWriter() << m_responseFile << ": " << m_command.text << "\n";
-    const ToolMessages found = ScanToolOutput(m_builder, result.output);
+    const std::string_view launcher = HasLauncher() ? FileNameOf(m_command.launcher.front()) : std::string_view();
+    const ToolMessages found = ScanToolOutput(m_builder, result.output, launcher);
     m_builder.errorCount += found.errors;
     m_builder.warningCount += found.warnings;
     const bool endedItself = result.succeeded && result.end.IsNormal();
-    m_hasSucceeded = endedItself && found.errors == 0 && !(IsGcc() && result.ReturnCode() != 0);
+    // Of a launcher one knows no better what a code means that is not 0, whatever compiler it was to run.
+    const bool codeCounts = IsGcc() || HasLauncher();
+    m_hasSucceeded = endedItself && found.errors == 0 && !(codeCounts && result.ReturnCode() != 0);
     // A tool that came to its own end clears away what it could not finish; gcc's driver may have been the one to end.
-    if (m_hasSucceeded || (endedItself && !IsGcc())) m_outputs->Keep();
+    if (m_hasSucceeded || (endedItself && !codeCounts)) m_outputs->Keep();
     m_outputs.reset();
     if (m_hasSucceeded) return;
-    if (found.errors == 0 && IsGcc() && result.ReturnCode() != 0) {
+    if (found.errors == 0 && codeCounts && result.ReturnCode() != 0) {
       TraceWriter() << "Return code : " << result.ReturnCode() << "\n";
+      if (HasLauncher()) TellMissingCompiler();
     }
     CountFailure(found.errors);
   }
 
  private:
   bool IsGcc() const { return IsGccFamily(m_builder.settings.compiler); }
+  bool HasLauncher() const { return !m_command.launcher.empty(); }
+  // The command line that was asked for, so that the text goes to a file after all.
+  bool IsTooLong() {
+    if (platform::FitsCommandLine(m_command.Words(m_builder.settings.compiler, ""))) return false;
+    if (std::exchange(m_builder.settings.hasToldOfLongCommand, true)) return true;
+    TraceWriter() << "Warning: What compiles " << m_file.path
+                  << " is longer than the system's command lines: it is put into a file, there and wherever it is\n";
+    return true;
+  }
+  void TellMissingCompiler() {
+    const std::string program = m_command.Program();
+    if (!platform::FindProgram(platform::NameHere(program)).empty()) return;
+    TraceWriter() << "ERROR: " << program << " was not found on PATH, which " << m_command.launcher.front()
+                  << " is to run\n";
+  }
   void CountFailure(int64_t errors = 0) {
     if (errors == 0) ++m_builder.errorCount;
     if (!m_hint.empty()) TraceWriter() << Hint(m_hint);
@@ -122,6 +157,10 @@ class ResourceObjectStep : public BuildStep {
       return std::nullopt;
     }
     return Command{.line = line.TakeText(), .echo = m_builder.settings.diagnostics, .failOnNonZero = true};
+  }
+
+  ToolTask Task() const override {
+    return {ToolKind::ResourceCompiler, m_builder.project.name, m_file.file.path, m_output, {m_file.SourcePath()}};
   }
 
   void Finish(const CommandResult& result) override {

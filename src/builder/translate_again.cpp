@@ -26,7 +26,9 @@ void ProjectBuilder::BeginPass(const std::vector<ProjectFile*>& changed) {
   const std::vector<ScannedFile*> taken = TakeBack(stale, all);
   std::for_each(taken.begin(), taken.end(), write);
   Symbols().BeginPass();
+  settings.faulty.clear();
   for (ScannedFile* file : all) {
+    if (file->state == TranslationState::Failed) file->TakeBack();
     file->isKept = file->state == TranslationState::Done;
     file->place = 0;
     file->tail.isRegistered = false;
@@ -39,7 +41,8 @@ bool ProjectBuilder::RegistriesMoved() {
   return unregisterMap.IsDirty() || registers;
 }
 
-void ProjectBuilder::WriteAgain(ScannedFile& file) {
+void ProjectBuilder::WriteAgain(ScannedFile& file, MakeReason::Cause why) {
+  if (settings.observer && !file.needsWriting) settings.observer->IsStale(paths.Translated(file.file), {why});
   if (file.isKept) {
     const std::vector<ScannedFile*> files{&file};
     for (ScannedFile* taken : TakeBack(files, AllFiles(*this))) taken->needsWriting = true;

@@ -23,10 +23,6 @@ namespace {
 
 constexpr char kUsage[] = "Usage...\nQrex pathToConfigFile\n";
 
-void WriteArgument(size_t index, const std::string& argument, const std::string& remark = {}) {
-  WriteToConsole("argv[" + std::to_string(index) + "] = " + argument + remark + "\n");
-}
-
 // name="value" or name='value'. Only the first three tokens are looked at.
 bool ReadAssignment(const std::string& argument, std::string& name, std::string& value) {
   LexScanner scanner{std::string_view(argument)};
@@ -75,12 +71,15 @@ std::string NoConfigurationHint(const std::string& argument) {
 
 }  // namespace
 
-// The index of the first argument that is no assignment.
-size_t CommandLine::ReadAssignments() {
-  size_t index = 1;
+void CommandLine::ShowArgument(size_t index, const std::string& remark) const {
+  if (!m_isListing) WriteToConsole("argv[" + std::to_string(index) + "] = " + m_arguments[index] + remark + "\n");
+}
+
+// The index of the first argument, from this one on, that is no assignment.
+size_t CommandLine::ReadAssignments(size_t index) {
   for (std::string name, value; index < m_arguments.size(); ++index) {
     if (!ReadAssignment(m_arguments[index], name, value)) break;
-    WriteArgument(index, m_arguments[index], " --> adding variable $" + name + "=" + value);
+    ShowArgument(index, " --> adding variable $" + name + "=" + value);
     m_settings.context.rootFrame.DefineSubstitution(name, value);
   }
   return index;
@@ -113,6 +112,33 @@ void CommandLine::RunParallelBuild() {
   timer.Label() << "Parallel build with devenv";
 }
 
+// The settings, from the arguments beginning with assignments; false, with a message, when they are none.
+bool CommandLine::LoadArguments(size_t firstArgument) {
+  const size_t configIndex = ReadAssignments(firstArgument);
+  if (configIndex >= m_arguments.size()) {
+    WriteToConsole(kUsage);
+    return false;
+  }
+  ShowArgument(configIndex);
+  ReadConfigurationPath(m_arguments[configIndex]);
+  std::string extraConfigText;
+  for (size_t i = configIndex + 1; i < m_arguments.size(); ++i) {
+    ShowArgument(i);
+    extraConfigText += m_arguments[i] + "\n";
+  }
+  if (!LoadConfiguration(m_settings, m_configPath, extraConfigText)) {
+    if (!FileExists(m_configPath)) TraceWriter() << Hint(NoConfigurationHint(m_arguments[configIndex]));
+    return false;
+  }
+  std::string problem = ValidateSettings(m_settings);
+  if (problem.empty()) problem = AddRuntimeRoot(m_settings, m_arguments[0]);
+  if (!problem.empty()) {
+    WriteToConsole(problem + "Error in config file " + m_configPath + "\n");
+    return false;
+  }
+  return true;
+}
+
 int CommandLine::RunConfiguration() {
   WriteToConsole(std::string(ProductLine()) + "\n");
   OpenTrace("stdout", false, false);
@@ -120,29 +146,8 @@ int CommandLine::RunConfiguration() {
     WriteToConsole(kUsage);
     return 1;
   }
-  WriteArgument(0, m_arguments[0]);
-  const size_t configIndex = ReadAssignments();
-  if (configIndex == m_arguments.size()) {
-    WriteToConsole(kUsage);
-    return 1;
-  }
-  WriteArgument(configIndex, m_arguments[configIndex]);
-  ReadConfigurationPath(m_arguments[configIndex]);
-  std::string extraConfigText;
-  for (size_t i = configIndex + 1; i < m_arguments.size(); ++i) {
-    WriteArgument(i, m_arguments[i]);
-    extraConfigText += m_arguments[i] + "\n";
-  }
-  if (!LoadConfiguration(m_settings, m_configPath, extraConfigText)) {
-    if (!FileExists(m_configPath)) TraceWriter() << Hint(NoConfigurationHint(m_arguments[configIndex]));
-    return 1;
-  }
-  std::string problem = ValidateSettings(m_settings);
-  if (problem.empty()) problem = AddRuntimeRoot(m_settings, m_arguments[0]);
-  if (!problem.empty()) {
-    WriteToConsole(problem + "Error in config file " + m_configPath + "\n");
-    return 1;
-  }
+  ShowArgument(0);
+  if (!LoadArguments(1)) return 1;
   if (const PlatformEnvironment* environment = m_settings.Environment()) {
     WriteToConsole("PATH = " + environment->PATH + "\nINCLUDE = " + environment->INCLUDE +
                    "\nLIB = " + environment->LIB + "\n");
@@ -151,6 +156,19 @@ int CommandLine::RunConfiguration() {
   if (m_parallelBuild) RunParallelBuild();
   CloseTrace();
   return 0;
+}
+
+// What is told on the way is of interest where the list cannot be made.
+int CommandLine::RunList() {
+  OpenTrace("stdout", false, false);
+  m_isListing = true;
+  std::string told, list;
+  HoldTrace(&told);
+  const bool isMade = LoadArguments(2) && ListWorkspace(m_settings, list);
+  HoldTrace(nullptr);
+  isMade ? WriteToConsole(list) : WriteHeldToTrace(told);
+  CloseTrace();
+  return isMade ? 0 : 1;
 }
 
 namespace {
@@ -171,6 +189,7 @@ int RunInit(const std::vector<std::string>& arguments) {
 int CommandLine::Dispatch() {
   const std::string_view first = m_arguments.size() > 1 ? m_arguments[1] : std::string_view();
   if (first == "--init") return RunInit(m_arguments);
+  if (first == "--list") return RunList();
   if (first == "--help") {
     WriteToConsole(HelpText());
     return 0;

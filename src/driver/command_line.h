@@ -19,7 +19,10 @@ class CommandLine {
  private:
   int Dispatch();
   int RunConfiguration();
-  size_t ReadAssignments();
+  int RunList();
+  bool LoadArguments(size_t firstArgument);
+  size_t ReadAssignments(size_t index);
+  void ShowArgument(size_t index, const std::string& remark = {}) const;
   void ReadConfigurationPath(const std::string& argument);
   void RunParallelBuild();
 
@@ -29,6 +32,7 @@ class CommandLine {
   std::string m_configPath;
   std::string m_solution;  // as typed, without the leading `*`
   bool m_parallelBuild = false;
+  bool m_isListing = false;  // standard output is for the list alone
 };
 
 }  // namespace qrex

@@ -25,7 +25,11 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"sizeofPointer", &ConfigSettings::sizeofPointer, "@size_of_pointer"},
     {"platformToolset", &ConfigSettings::platformToolset,
      "the tool set in .vcxproj files: v143; projects may name theirs, too"},
+    {"sourceFolder", &ConfigSettings::sourceFolder, "where relative roots begin, if not where Qrex runs"},
+    {"depfile", &ConfigSettings::depfile, "the file to write what the run read into, as make and ninja read it"},
     {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
+    {"buildTrace", &ConfigSettings::buildTrace, "a file for the trace of a build, as trace viewers read it"},
+    {"report", &ConfigSettings::report, "a file for a page on the build: what ran when, what it cost, and why"},
 };
 
 inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
@@ -46,6 +50,9 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
+    {"keepGoing", &ConfigSettings::keepGoing, "go on behind a translation error, tell all of them, end with status 1"},
+    {"commandFiles", &ConfigSettings::commandFiles,
+     "compilers read their options in response files, else on command lines"},
 };
 
 inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {
@@ -55,6 +62,10 @@ inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {
 inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kListKeys[] = {
     {"virtualTree", &ConfigSettings::virtualTree, "the roots under which workspaces, projects and sources are found"},
     {"workspaces", &ConfigSettings::workspaces, "workspace files and single projects, by their path below a root"},
+};
+
+inline constexpr ConfigKey<std::vector<std::string> ConfigSettings::*> kCommandKeys[] = {
+    {"launcher", &ConfigSettings::launcher, "a command ahead of compilers, by its words: ccache, distcc"},
 };
 
 inline constexpr ConfigKey<std::string PlatformEnvironment::*> kEnvironmentKeys[] = {

@@ -35,7 +35,7 @@ class ConfigParser : public MpfwParser {
   explicit ConfigParser(ConfigSettings& settings) : MpfwParser(settings.context), m_settings(settings) {}
 
   bool ResolveImport(const std::string& path, std::string& found) override {
-    return FindImport(m_settings, path, found);
+    return FindImport(m_settings, path, found) || FindBesideConfiguration(path, found);
   }
   std::string ImportHint(const std::string& path) const override { return TriedImports(m_settings, path); }
   void OnImportedFile(MpfwSourceFile& file) override {
@@ -48,6 +48,7 @@ class ConfigParser : public MpfwParser {
   }
 
  private:
+  bool FindBesideConfiguration(const std::string& path, std::string& found) const;
   void ParseStatement();
   bool ParseChoice();
   bool ChooseCompiler(const std::string& word, const LexToken& token);
@@ -56,6 +57,8 @@ class ConfigParser : public MpfwParser {
   void ParseVariable();
   void ParseEnvironment(std::string PlatformEnvironment::*field);
   void ParseList(std::vector<std::string>& list);
+  void ParseCommand(std::vector<std::string>& words);
+  void ReadListBody(std::vector<std::string>& list);  // behind its `{`
   void ParseNumberKey(int64_t& number);
   bool ReadAssignment();  // `=` or `+=`; true: the list starts anew
   std::string ReadWord();
@@ -64,6 +67,18 @@ class ConfigParser : public MpfwParser {
 
   ConfigSettings& m_settings;
 };
+
+// A run in another folder finds what stands in that of the configuration.
+bool ConfigParser::FindBesideConfiguration(const std::string& path, std::string& found) const {
+  const std::string& configuration = m_settings.sourceFiles.front()->path;
+  const std::string folder = configuration.substr(0, configuration.rfind('/') + 1);
+  if (folder.empty() || IsAbsolutePath(path)) return false;
+  if (FindImport(m_settings, folder + path, found)) return true;
+  for (const std::string& directory : m_settings.context.importPaths) {
+    if (!IsAbsolutePath(directory) && FindImport(m_settings, folder + PathJoin(directory, path), found)) return true;
+  }
+  return false;
+}
 
 // A key that takes one of a few words.
 bool ConfigParser::ParseChoice() {
@@ -116,6 +131,7 @@ void ConfigParser::ParseStatement() {
   if (current.kind == kDollar) return ParseVariable();
   if (const auto* key = FindRow(kEnvironmentKeys, current)) return ParseEnvironment(key->field);
   if (const auto* key = FindRow(kListKeys, current)) return ParseList(m_settings.*key->field);
+  if (const auto* key = FindRow(kCommandKeys, current)) return ParseCommand(m_settings.*key->field);
   if (const auto* key = FindRow(kNumberKeys, current)) return ParseNumberKey(m_settings.*key->field);
   if (const auto* key = FindRow(kStringKeys, current)) {
     Advance();
@@ -220,12 +236,36 @@ void ConfigParser::ParseNumberKey(int64_t& number) {
 void ConfigParser::ParseList(std::vector<std::string>& list) {
   Advance();
   if (ReadAssignment()) list.clear();
+  ReadListBody(list);
+}
+
+void ConfigParser::ReadListBody(std::vector<std::string>& list) {
   while (current.kind != kCloseBrace) {
     std::string entry;
     ReadName(entry);
     list.push_back(std::move(entry));
   }
   Advance();
+}
+
+// A list of words, or one word; an empty one is no command.
+void ConfigParser::ParseCommand(std::vector<std::string>& words) {
+  Advance();
+  Expect(kAssign, "=");
+  words.clear();
+  if (current.kind == kOpenBrace) {
+    Advance();
+    return ReadListBody(words);
+  }
+  std::string word;
+  ReadName(word);
+  if (!word.empty()) words.push_back(std::move(word));
+}
+
+void PlaceRoots(ConfigSettings& settings) {
+  for (std::string& root : settings.virtualTree) {
+    if (!IsAbsolutePath(root)) root = PathJoin(settings.sourceFolder, root);
+  }
 }
 
 }  // namespace
@@ -250,6 +290,7 @@ bool LoadConfiguration(ConfigSettings& settings, const std::string& path, const 
   try {
     parser.SetInput(expansion);
     parser.ParseStatements();
+    if (!settings.sourceFolder.empty()) PlaceRoots(settings);
     return true;
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);

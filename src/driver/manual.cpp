@@ -55,6 +55,7 @@ std::vector<ManualRow> KeyRows() {
   add("compiler", Word(" = ", CompilerOf(defaults.compiler).keyword), "one of " + CompilerWords());
   for (const Compiler& compiler : kCompilers) rows.back().values.emplace_back(compiler.keyword);
   for (const auto& key : kListKeys) add(key.word, " = { }", key.help);
+  for (const auto& key : kCommandKeys) add(key.word, " = \"\"", key.help);
   add("runtime", Word(" = ", kRuntimes[static_cast<size_t>(defaults.runtime)]), kRuntimeHelp);
   for (const std::string_view runtime : kRuntimes) rows.back().values.emplace_back(runtime);
   for (const auto& key : kStringKeys) add(key.word, " = \"\"", key.help);

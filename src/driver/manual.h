@@ -20,6 +20,8 @@ inline constexpr CallForm kCallForms[] = {
     {"", "[*]FOLDER/FILE.sln",
      "stands for FILE.qrex, with * for FILE.translate.qrex, and builds build_FILE.sln afterwards"},
     {"--init", "NAME [FOLDER]", "lays out a workspace that builds and runs, in the folder NAME; overwrites nothing"},
+    {"--list", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...]",
+     "tells what a run would read and translate, for scripts: docs/cmake.md has the form"},
     {"--help", "", "this text"},
     {"--version", "", "the release"},
 };

@@ -6,7 +6,10 @@
 #include <vector>
 
 #include "builder/project_builder.h"
-#include "builder/tools.h"
+#include "driver/depfile.h"
+#include "driver/listing.h"
+#include "driver/observers.h"
+#include "driver/project_queue.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"
@@ -33,6 +36,8 @@ class WorkspaceRun {
   explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
   bool LoadAll();
   bool Run(ScopeTimer& timer);
+  const Workspace& Loaded() const { return m_workspace; }
+  bool IsCompleted() const { return m_isCompleted; }  // else an error has ended it early
 
  private:
   bool LoadWorkspaceFile(const std::string& entry);
@@ -55,9 +60,9 @@ class WorkspaceRun {
   ConfigSettings& m_settings;
   Workspace m_workspace;
   Generator m_generator{m_settings.leftovers};
-  int64_t m_errors = 0;
-  int64_t m_warnings = 0;
+  ProjectQueue m_queue{m_settings};
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
+  bool m_isCompleted = false;
 };
 
 std::string PrintedList(const std::vector<std::string>& entries) {
@@ -160,17 +165,22 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     for (size_t i = 0; i < m_workspace.projects.size(); ++i) {
       Project& project = *m_workspace.projects[i];
       if (IsLeftAlone(project) || ProcessProject(project)) continue;
+      m_queue.Finish();
       ReportLeftOut(i + 1);
       return false;
     }
+    if (!m_queue.Finish()) return false;
   }
+  if (m_queue.Errors() == 0 && !WriteDepfile(m_workspace, m_generator.Files())) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
-  if (m_warnings > 0 || m_errors > 0) {
-    timer.Label() << " with " << m_warnings << " warnings, " << m_errors << " errors";
+  m_isCompleted = true;
+  if (m_queue.Warnings() > 0 || m_queue.Errors() > 0) {
+    timer.Label() << " with " << m_queue.Warnings() << " warnings, " << m_queue.Errors() << " errors";
   }
-  return m_errors == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
+  if (!m_settings.faulty.empty()) return false;
+  return m_queue.Errors() == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
 }
 
 // After an error that ends the run.
@@ -195,12 +205,11 @@ bool WorkspaceRun::ProcessProject(Project& project) {
     if (m_settings.mode == RunMode::Build) Repackage(project);
   }
   const bool isTranslated = project.usesQrex && (!project.exported || IsLibrary(project.targetType));
-  if (isTranslated && !BuildProject(project)) return false;
-  if (!project.exported && m_settings.exportPublicHeaders && m_settings.mode == RunMode::Build) {
-    ProjectConfig* config = FindProjectConfig(project);
-    if (!config) return false;
-    ExportPublicHeaders(project, *config);
-  }
+  if (isTranslated) return BuildProject(project);
+  if (!m_queue.ExportsHeaders(project)) return true;
+  ProjectConfig* config = FindProjectConfig(project);
+  if (!config) return false;
+  ExportPublicHeaders(project, *config);
   return true;
 }
 
@@ -289,45 +298,10 @@ ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
   return config;
 }
 
-// What ends a build early is reported here, and ends the run.
-template <typename Work>
-bool Guarded(const ConfigSettings& settings, Work work) {
-  try {
-    work();
-    return true;
-  } catch (const LexScannerException& exception) {
-    settings.Tell(Message(Severity::Error, "error : ", exception.message)
-                      .At({exception.file, exception.line, exception.begin, exception.end})
-                      .WithHint(exception.hint)
-                      .Apart());
-  } catch (const IException& exception) {
-    settings.Tell(Message(Severity::Error, "Error: ", ExceptionText(exception)));
-  }
-  return false;
-}
-
 bool WorkspaceRun::BuildProject(Project& project) {
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
-  return Guarded(m_settings, [&] {
-    ProjectBuilder builder(m_settings, project, *config);
-    ScopeTimer timer;
-    const std::string dependencyFile = DependencyFilePath(project, *config);
-    bool succeeded = true;
-    if (m_settings.mode == RunMode::Clean) {
-      builder.Clean(dependencyFile);
-      succeeded = builder.errorCount == 0;
-    } else {
-      succeeded = builder.Build(dependencyFile, nullptr);
-      TellCopiedSources(project);
-    }
-    m_errors += builder.errorCount;
-    m_warnings += builder.warningCount;
-    if (succeeded) {
-      timer.Stop();
-      timer.Label() << project.name;
-    }
-  });
+  return m_settings.mode == RunMode::Clean ? m_queue.Clean(project, *config) : m_queue.Build(project, *config);
 }
 
 void WorkspaceRun::GenerateWorkspace() {
@@ -369,12 +343,12 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   }
   ProjectConfig* config = FindProjectConfig(project);
   if (!config) return false;
-  ProjectBuilder builder(m_settings, project, *config);
-  DeleteReporting(builder.paths.Translated(*file));
-  if (!Guarded(m_settings, [&] { builder.Build(DependencyFilePath(project, *config), file); })) return false;
+  DeleteReporting(BuildPaths(project, *config).Translated(*file));
+  if (!m_queue.Compile(project, *config, *file)) return false;
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Compile completed";
+  m_isCompleted = true;
   return true;
 }
 
@@ -470,7 +444,18 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   }
   const auto run = std::make_shared<WorkspaceRun>(settings);
   if (loaded) *loaded = run;
-  return run->LoadAll() && run->Run(timer);
+  RunObservers observers(settings);
+  observers.Expect(run->Loaded());
+  const bool succeeded = run->LoadAll() && run->Run(timer);
+  return observers.End(run->IsCompleted()) && succeeded;
+}
+
+bool ListWorkspace(ConfigSettings& settings, std::string& list) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings);
+  if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
+  list = ListingOf(run.Loaded());
+  return true;
 }
 
 }  // namespace qrex

@@ -14,6 +14,10 @@ namespace qrex {
 // cost a tenth of the run.
 bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded = nullptr);
 
+// Loads the same, and tells of it in the form of driver/listing.h. False, with a message, where something cannot be
+// loaded.
+bool ListWorkspace(ConfigSettings& settings, std::string& list);
+
 // The deepest directory of the path that holds the marker, and the path relative to it.
 bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative);
 bool CheckPathSyntax(const ConfigSettings& settings);

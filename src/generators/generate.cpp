@@ -54,7 +54,8 @@ void Generator::Generate(const std::string& path, void (*write)(TextWriter&, Arg
   }
   MemoryTextWriter out;
   write(out, args...);
-  if (UpdateFile(m_leftovers, out, path) != FileUpdate::Failed) m_upToDate.insert(path);
+  if (UpdateFile(m_leftovers, out, path) == FileUpdate::Failed) return;
+  if (m_upToDate.insert(path).second) m_files.push_back(path);
 }
 
 void Generator::WriteProjectMakeFiles(Project& project) {

@@ -4,6 +4,7 @@
 #include <string>
 #include <type_traits>
 #include <unordered_set>
+#include <vector>
 
 #include "generators/form.h"
 #include "text/files.h"
@@ -19,6 +20,7 @@ class Generator {
   explicit Generator(LeftoverSweep& leftovers) : m_leftovers(leftovers) {}
   void WriteProject(Project& project, Form form);
   void WriteWorkspace(Workspace& workspace, Form form);
+  const std::vector<std::string>& Files() const { return m_files; }  // that are written, or as they should be
 
  private:
   void BeginPass(Form form);
@@ -31,6 +33,7 @@ class Generator {
   void WriteTopMakeFiles(const Workspace& workspace);
 
   LeftoverSweep& m_leftovers;
+  std::vector<std::string> m_files;
   // Files of the project or workspace that are up to date. The gcc family has one form of its files: the second pass
   // leaves out what the first one wrote.
   std::unordered_set<std::string> m_upToDate;

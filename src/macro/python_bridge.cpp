@@ -72,6 +72,7 @@ Object* WriteToStdOut(Object*, Object* arguments) {
   if (!py.PyArg_ParseTuple(arguments, "s", &text)) return nullptr;
   try {
     WriteToConsole(text);
+    platform::HideStatusLine();
     platform::FlushStdout();  // what Python writes past its `sys.stdout` comes behind
   } catch (const IException& exception) {
     py.PyErr_SetString(*py.PyExc_IOError, ExceptionText(exception).c_str());
@@ -210,7 +211,10 @@ void WritePythonValue(TextWriter& writer, Object* object, const char* position, 
 // The tool and Python's own file objects write to one output in turn. Paths of the run are relative to the folder in
 // which it began, wherever Python went.
 struct PythonScope {
-  PythonScope() { platform::FlushStdout(); }
+  PythonScope() {
+    platform::HideStatusLine();
+    platform::FlushStdout();
+  }
   ~PythonScope() {
     platform::FlushAllStreams();
     folder.Return();

@@ -74,11 +74,14 @@ std::string WithoutInterpreter(const std::string& line) {
 
 }  // namespace
 
+std::string NameHere(const std::string& tool) {
+  return tool == "gcc-4" && FindProgram(tool).empty() ? tool.substr(0, tool.find('-')) : tool;
+}
+
 std::string ForInterpreter(const std::string& line) {
-  constexpr std::string_view kCompiler = "gcc-4 ";
-  std::string command = WithoutInterpreter(line);
-  if (command.starts_with(kCompiler) && FindProgram("gcc-4").empty()) command.erase(3, 2);
-  return ForShell(command);
+  const std::string command = WithoutInterpreter(line);
+  const size_t end = std::min(command.find(' '), command.size());
+  return ForShell(NameHere(command.substr(0, end)) + command.substr(end));
 }
 
 bool IsBatchFile(const std::string& line) {

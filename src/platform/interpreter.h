@@ -9,6 +9,7 @@ namespace qrex::platform {
 
 constexpr char kInterpreterPath[] = "/bin/sh";
 std::string ForInterpreter(const std::string& line);  // the line as the shell of this system reads it
+std::string NameHere(const std::string& tool);        // "gcc-4" is "gcc" where there is no other
 
 // The batch file that marks a manifest's update is the one that this system has to carry out itself.
 bool IsBatchFile(const std::string& line);

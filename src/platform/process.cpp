@@ -8,6 +8,7 @@
 #include <array>
 #include <cerrno>
 #include <csignal>
+#include <cstring>
 
 #include "platform/console.h"
 #include "platform/interpreter.h"
@@ -178,6 +179,20 @@ class Processes::Running {
   }
 };
 
+bool FitsCommandLine(const std::vector<std::string>& words) {
+  constexpr size_t kLongestWord = 32 * 4096 - 1;  // of Linux: MAX_ARG_STRLEN
+  constexpr size_t kRoom = 64 * 1024;
+  const long limit = sysconf(_SC_ARG_MAX);
+  size_t size = kRoom;
+  const auto add = [&](size_t length) { size += length + 1 + sizeof(char*); };
+  for (const std::string& word : words) {
+    if (word.size() > kLongestWord) return false;
+    add(word.size());
+  }
+  for (char** variable = environ; *variable; ++variable) add(std::strlen(*variable));
+  return limit < 0 || size <= static_cast<size_t>(limit);
+}
+
 Processes::Processes() = default;
 Processes::~Processes() = default;
 
@@ -297,6 +312,7 @@ void Processes::ReapOne() {
 // Its tools do not outlive it.
 void Processes::LoseKeeper() {
   m_keeper.reset();
+  ToolKeeper::EndWhatIsLeft();
   while (!m_running.empty()) End(*m_running.front(), BySignal(SIGKILL));
 }
 

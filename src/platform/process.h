@@ -70,6 +70,10 @@ class CapturedText {
   bool m_isWhole = true;
 };
 
+// Whether the system starts a program with so many words, of that length, and leaves room for the variables that a
+// program ahead of it may add.
+bool FitsCommandLine(const std::vector<std::string>& words);
+
 class Processes {
  public:
   using Id = uint32_t;  // of this object, from 0 up

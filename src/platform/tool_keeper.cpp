@@ -17,6 +17,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <ctime>
+#include <functional>
 #include <map>
 #include <set>
 #include <vector>
@@ -140,6 +141,31 @@ std::vector<pid_t> Children() {
   return children;
 }
 
+// Those that are meant, and what becomes a child as they end. Each has a second to take its temporary files away.
+void EndChildren(const std::function<bool(pid_t)>& areMeant, const std::function<void(pid_t)>& reap) {
+  constexpr int kMostPolite = 100;
+  constexpr timespec kNap = {0, 10'000'000};
+  std::set<pid_t> told;
+  for (int round = 0;; ++round) {
+    bool isAnyLeft = false;
+    for (const pid_t child : Children()) {
+      if (!areMeant(child)) continue;
+      isAnyLeft = true;
+      if (round >= kMostPolite) {
+        kill(child, SIGKILL);
+      } else if (told.insert(child).second) {
+        kill(child, SIGTERM);
+        kill(child, SIGCONT);
+      }
+    }
+    if (!isAnyLeft) return;
+    nanosleep(&kNap, nullptr);
+    for (const pid_t child : told) reap(child);
+  }
+}
+
+bool IsOfThisSession(pid_t process) { return getsid(process) == getsid(0); }  // no server that is to stay
+
 class Keeper {
  public:
   Keeper(int socket, pid_t toolGroup) : m_socket(socket), m_toolGroup(toolGroup) {
@@ -163,7 +189,7 @@ class Keeper {
         signalfd_siginfo ignored;
         while (read(m_childEnds, &ignored, sizeof ignored) > 0) {
         }
-        if (Reap()) EndChildren(Which::Orphans);  // a compiler's driver was killed, and its assembler writes on
+        if (Reap()) End(Which::Orphans);  // a compiler's driver was killed, and its assembler writes on
         SendReplies();
       }
       if (events[0].revents == 0) continue;
@@ -187,7 +213,7 @@ class Keeper {
         return true;
       }
     }
-    if (!isAsked || head.kind != RequestHead::Kind::Goodbye || !m_tools.empty()) EndChildren(Which::All);
+    if (!isAsked || head.kind != RequestHead::Kind::Goodbye || !m_tools.empty()) End(Which::All);
     return isAsked && head.kind == RequestHead::Kind::EndTools;
   }
 
@@ -248,28 +274,9 @@ class Keeper {
     return wasKilled;
   }
 
-  // Each has a second to take its temporary files away.
-  void EndChildren(Which which) {
-    constexpr int kMostPolite = 100;
-    constexpr timespec kNap = {0, 10'000'000};
-    std::set<pid_t> told;
-    for (int round = 0;; ++round) {
-      bool isAnyLeft = false;
-      for (const pid_t child : Children()) {
-        const bool isTool = m_tools.contains(child);
-        if (isTool ? which == Which::Orphans : getsid(child) != getsid(0)) continue;
-        isAnyLeft = true;
-        if (round >= kMostPolite) {
-          kill(child, SIGKILL);
-        } else if (told.insert(child).second) {
-          kill(child, SIGTERM);
-          kill(child, SIGCONT);
-        }
-      }
-      if (!isAnyLeft) return;
-      nanosleep(&kNap, nullptr);
-      Reap();
-    }
+  void End(Which which) {
+    EndChildren([&](pid_t child) { return m_tools.contains(child) ? which == Which::All : IsOfThisSession(child); },
+                [this](pid_t) { Reap(); });
   }
 
   void SendReplies() {
@@ -290,6 +297,7 @@ class Keeper {
 // --- This process
 
 std::unique_ptr<ToolKeeper> ToolKeeper::Start() {
+  prctl(PR_SET_CHILD_SUBREAPER, 1);  // what a keeper leaves that is killed becomes a child of this process
   int sockets[2];
   if (socketpair(AF_UNIX, SOCK_STREAM | SOCK_CLOEXEC, 0, sockets) != 0) return nullptr;
   Descriptor ours(sockets[0]), theirs(sockets[1]);
@@ -313,6 +321,10 @@ ToolKeeper::~ToolKeeper() {
   m_socket.Close();
   while (waitpid(m_process, nullptr, 0) < 0 && errno == EINTR) {
   }
+}
+
+void ToolKeeper::EndWhatIsLeft() {
+  EndChildren(IsOfThisSession, [](pid_t child) { waitpid(child, nullptr, WNOHANG); });
 }
 
 bool ToolKeeper::Ask(const ToolRequest& request) {

@@ -43,6 +43,9 @@ class ToolKeeper {
   ToolKeeper(const ToolKeeper&) = delete;
   ToolKeeper& operator=(const ToolKeeper&) = delete;
 
+  // Behind the end of a keeper that was killed: ends what its tools had started, which would write on.
+  static void EndWhatIsLeft();
+
   // False: the keeper is gone, and its tools with it.
   bool Ask(const ToolRequest& request);
   bool EndTools();  // each is answered as if it had ended itself

@@ -3,6 +3,7 @@
 
 #include <map>
 #include <memory>
+#include <set>
 #include <string>
 #include <unordered_set>
 #include <vector>
@@ -17,6 +18,9 @@
 
 namespace qrex {
 
+class Project;
+class BuildObserver;  // builder/build_observer.h
+
 enum class RunMode { Clean, Compile, Build, Gen, Show };
 enum class RuntimeChoice { None, Source, Built };
 
@@ -30,6 +34,7 @@ struct ConfigSettings {
   MacroWorld macroWorld;
   MpfwContext context{sourceFiles, macroWorld};
   std::vector<std::string> virtualTree;
+  std::string sourceFolder;  // where relative roots begin; empty: the folder of the run
   std::string exportLib;
   std::string exportTranslatedInclude;
   std::string exportUntranslatedInclude;
@@ -53,19 +58,31 @@ struct ConfigSettings {
   bool makeExportedHeaderFilesReadOnly = true;
   bool modernCpp = false;
   bool compilableText = false;
-  int64_t jobs = 1;  // tools at once; 0: as many as there are processors
+  int64_t jobs = 1;                   // tools at once; 0: as many as there are processors
+  std::vector<std::string> launcher;  // words ahead of compilers
+  bool commandFiles = true;  // compilers are given response files; false: command lines, where they are not too long
   bool failOnErrors = false;
+  bool keepGoing = false;                       // an error in a source ends its translation, and not the run
+  std::string buildTrace;                       // the file of a trace; empty: none is written
+  std::string report;                           // and that of a page
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
+  std::string depfile;                // to be written behind a run; empty: none
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   // Whoever may read the settings may write files and run tools.
   mutable LeftoverSweep leftovers;
+  mutable std::set<std::string> listedFolders;  // those that were searched by wildcards
   mutable OutputNotes outputNotes{"qrexsource/unfinished.notes"};
   mutable platform::Processes tools;
   std::unique_ptr<platform::JobServer> jobServer;  // of the make that runs this program; null: none
   // Objects and targets of this run: where stamps are equal, it is later than what stood there before.
   std::unordered_set<std::string> made;
+  bool hasToldOfLongCommand = false;
+  std::unordered_set<std::string> faulty;     // sources with an error, which has been told
+  std::unordered_set<const Project*> unmade;  // whose target could not be made
+  BuildObserver* observer = nullptr;          // of the build, not owned; null: nobody looks
+  bool coloursToolMessages = false;           // where a terminal shows them
 
   void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null

@@ -129,6 +129,7 @@ void ProjectParser::FindUnder(const std::string& root, Search& search, ProjectFo
   if (search.open.size() >= kMaxNesting || platform::IsStackShort())
     throw LexScannerException("Directories nested too deeply", current);
   search.open.push_back(realPath);
+  m_project.settings->listedFolders.insert(searched);
   std::vector<std::string> names;
   FileOrDirIterator entries(searched + "/*");
   if (entries.FailureCode() != 0) FailSearch(searched, entries.FailureCode());

@@ -10,7 +10,10 @@ namespace {
 
 class StepsTest : public WorldTest {
  protected:
-  StepsTest() : m_path(std::getenv("PATH")) { setenv("PATH", ("tools:" + m_path).c_str(), 1); }
+  StepsTest() : m_path(std::getenv("PATH")) {
+    setenv("PATH", ("tools:" + m_path).c_str(), 1);
+    settings.compiler = CompilerKind::gcc;
+  }
   ~StepsTest() override { setenv("PATH", m_path.c_str(), 1); }
 
   static void AddTool(const std::string& name, const std::string& script) {
@@ -94,12 +97,13 @@ class NotedStep : public BuildStep {
 TEST_F(StepsTest, StepsAreFinishedInTheirOrder) {
   // The first ends last, once the third has begun.
   AddTool("await", "while [ ! -e c ]; do sleep 0.01; done; exit 3\n");
-  const std::pair<size_t, const char*> cases[] = {{1, "a+ a0 a! b+ b5 b? c+ c0 c+ c0 c! "},
-                                                  {3, "a+ b+ c+ a3 a? b5 b? c0 c+ c0 c! "}};
+  const std::pair<int, const char*> cases[] = {{1, "a+ a0 a! b+ b5 b? c+ c0 c+ c0 c! "},
+                                               {3, "a+ b+ c+ a3 a? b5 b? c0 c+ c0 c! "}};
   for (const auto& [slots, expected] : cases) {
     DeleteFile("c");
     std::string notes;
-    Scheduler scheduler(settings.tools, slots);
+    settings.jobs = slots;
+    Scheduler scheduler(settings);
     auto add = [&](char name, std::vector<std::string> lines) {
       scheduler.Add(std::make_unique<NotedStep>(notes, name, std::move(lines)),
                     [&notes, name](bool succeeded) { notes.append(1, name).append(succeeded ? "! " : "? "); });
@@ -116,7 +120,8 @@ TEST_F(StepsTest, AnInterruptEndsAllSteps) {
   AddTool("writes", "echo half > \"$1\"; sleep 30\n");
   AddTool("stopped", "while [ ! -e y ]; do sleep 0.01; done; kill -INT $$\n");
   std::string notes;
-  Scheduler scheduler(settings.tools, 3);
+  settings.jobs = 3;
+  Scheduler scheduler(settings);
   EXPECT_EQ("Interrupted while running stopped", MessageOf([&] {
               for (const char* line : {"stopped", "writes x", "writes y"}) {
                 scheduler.Add(std::make_unique<NotedStep>(notes, 'x', std::vector<std::string>{line}), [](bool) {});

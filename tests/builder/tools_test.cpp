@@ -4,6 +4,7 @@
 
 #include "builder/tools.h"
 
+#include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/paths.h"
 #include "translator/file/translate_file.h"
@@ -276,6 +277,49 @@ TEST_F(ToolsTest, MessagesAreCounted) {
     EXPECT_EQ(test.warnings, found.warnings) << test.text;
     EXPECT_EQ(test.text, trace);
   }
+}
+
+TEST_F(ToolsTest, LaunchersSpeakForThemselves) {
+  AddApp("Application", "");
+  Builder(CompilerKind::gcc);
+  const ToolMessages found = ScanToolOutput(
+      *builder,
+      "distcc[7] h:1: error: x\nDISTCC: a.cpp:1: error\ndistcc.cpp:1: error: y\na.cpp:1: warning: distcc: z\n",
+      "distcc");
+  EXPECT_EQ(1, found.errors);
+  EXPECT_EQ(1, found.warnings);
+}
+
+TEST_F(ToolsTest, WordsAreThoseThatTheToolWouldRead) {
+  using Words = std::vector<std::string>;
+  constexpr CompilerKind kGcc = CompilerKind::gcc, kVisual = CompilerKind::vc9;
+  const struct {
+    CompilerKind compiler;
+    const char* text;
+    Words words;
+  } cases[] = {
+      {kGcc,
+       " -DA=\"b c\"  -I\"d\\\\e\"\t'f \"g'\r\n\\\"h \"\" i\\ j",
+       {"-DA=b c", "-Id\\e", "f \"g", "\"h", "", "i j"}},
+      {kGcc, "\"open end", {"open end"}},
+      {kGcc, " \n", {}},
+      {kGcc, "end\\", {"end\\"}},
+      {kVisual,
+       "/Fo\"a b/\" /DX=\\\"y\\\" c\\d \"e\\\\\" 'f g' \\\\\\\"",
+       {"/Foa b/", "/DX=\"y\"", "c\\d", "e\\", "'f", "g'", "\\\""}},
+  };
+  for (const auto& test : cases) EXPECT_EQ(test.words, ResponseWords(test.compiler, test.text)) << test.text;
+}
+
+TEST_F(ToolsTest, ALauncherMayFailForEveryFamily) {
+  AddTool("lead", "echo \"lead $*\" >> log; \"$@\"\nexit 3\n");
+  settings.launcher = {"lead", "a b"};
+  AddApp("Application", "\"x.cpp\"");
+  Write("tree/app/src/x.cpp", "int x;\n");
+  Builder(CompilerKind::vc9);
+  EXPECT_FALSE(MakeObject("x.cpp"));
+  EXPECT_EQ(1, builder->errorCount);
+  EXPECT_NE(std::string::npos, TakeLog().find("lead a b cl /c @x64/Debug/app/compiler.rsp\n"));
 }
 
 TEST_F(ToolsTest, ManyMessagesInALineTakeLinearTime) {

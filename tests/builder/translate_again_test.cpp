@@ -138,7 +138,7 @@ class TranslateAgainTest : public WorldTest {
     namespace fs = std::filesystem;
     fs::create_directories("qrexsource");
     fs::rename("qrexsource", "living");
-    ProjectBuilder fresh(settings, App(), *App().configs.front());
+    ProjectBuilder fresh(settings, App(), *App().configs.front(), *scheduler);
     std::pair<std::string, std::map<std::string, std::string>> result;
     result.first = ErrorOf([&] { fresh.Build("fresh.qrexdep", nullptr); });
     result.second = Outputs();

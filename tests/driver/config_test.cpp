@@ -110,6 +110,18 @@ TEST_F(ConfigTest, Environments) {
   EXPECT_EQ(&environment, Got().Environment());
 }
 
+TEST_F(ConfigTest, Launcher) {
+  using Words = std::vector<std::string>;
+  for (const auto& [value, words] :
+       std::initializer_list<std::pair<const char*, Words>>{{"\"c c\"", {"c c"}},
+                                                            {"{ \"a\" \"$(config)x\" }", {"a", "x"}},
+                                                            {"\"a\" launcher = \"\"", {}},
+                                                            {"{ }", {}}}) {
+    Load("$config = \"\" launcher = " + std::string(value));
+    EXPECT_EQ(words, Got().launcher) << value;
+  }
+}
+
 TEST_F(ConfigTest, Messages) {
   for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
            {"\nmode clean", "(2) : Expected = after mode when read clean"},
@@ -121,6 +133,8 @@ TEST_F(ConfigTest, Messages) {
            {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},
            {"jobs = -1", "(1) : Expected number after = when read -"},
            {"jobs = 9999999", "(1) : Expected number after = when read 9999999"},
+           {"launcher = ccache", "(1) : Expected quoted string when read ccache"},
+           {"launcher += { }", "(1) : Expected = after launcher when read +="},
            {"PATH('a') = { }", "(1) : Expected double quoted string after ( when read 'a'"},
            {"PATH = { }", "(1) : Expected ( after PATH when read ="},
            {"LIB(\"a\") { }", "(1) : Expected = after ) when read {"},

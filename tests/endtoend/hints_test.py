@@ -29,7 +29,8 @@ HERE = " (relative paths begin in the folder where Qrex runs)"
 def on_terminal(command, folder):
     """What the command writes to a terminal."""
     terminal, its_end = pty.openpty()
-    process = subprocess.Popen(command, cwd=folder, stdin=its_end, stdout=its_end, stderr=its_end)
+    process = subprocess.Popen(command, cwd=folder, stdin=its_end, stdout=its_end, stderr=its_end,
+                               env={**os.environ, "TERM": "dumb"})  # which takes no status line
     os.close(its_end)
     output = b""
     while True:
@@ -174,7 +175,7 @@ def make_files_whose_call_builds_nothing(binary):
 
 def a_configuration_that_is_none(binary):
     quotes = "; a line of the configuration stands behind the file"
-    for argument, hint in (("--hlep", "did you mean --help?"), ("--frob", "the options are --help --init --version"),
+    for argument, hint in (("--hlep", "did you mean --help?"), ("--frob", "the options are --help --init --list --version"),
                            ("X=/p", "a variable has its value in quotes: 'X=\"/p\"'" + quotes)):
         with Workspace(binary, {}) as workspace:
             output = on_terminal([binary, argument], workspace.folder)

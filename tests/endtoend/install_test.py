@@ -17,7 +17,8 @@ sys.path.insert(0, str(Path(__file__).parent))
 from workspace_fixture import equal, holds, lacks, need, run_tests  # noqa: E402
 
 INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
-             "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex"]
+             "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex",
+             "lib/cmake/Qrex/QrexConfig.cmake"]
 RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h", "lib/qrex/include/Vesk/vxObject/IObject.h",
            "lib/qrex/runtime/x64/Debug/libvxObject.a", "lib/qrex/runtime/x64/Release/libvxObject.a"]
 

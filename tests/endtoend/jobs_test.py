@@ -95,6 +95,15 @@ def test_interrupt_leaves_nothing_half_made(workspace):
         equal((objects, workspace.times("x64/**/*.rsp")), ([], {}))
 
 
+@in_workspace(files(True))
+def test_the_next_project_begins_beside_the_last_one(workspace):
+    # A compiler of the first project ends when one of the second has begun; neither is linked ahead of its objects.
+    workspace.append("tools/gcc-4", "case $source in *good.cpp) until [ -e begun ]; do sleep 0.01; done;; *bad.cpp) touch begun;; esac\n")
+    log = workspace.run("all.qrex", "jobs=2", "diagnostics=true")
+    holds(log, "good/good.o.rsp", "ar rcs", "libgood.a", "good....", "bad/bad0.o.rsp")
+    holds(workspace.path("out/lib/x64/Debug/libgood.a").read_text(), "int good0;", "int good;")
+
+
 @in_workspace(files(False), "make")
 def test_make_grants_jobs(workspace):
     # With `+` the recipe is given the job server; without it the numbers alone, which lead nowhere.
@@ -106,4 +115,4 @@ def test_make_grants_jobs(workspace):
 
 
 run_tests([test_log_and_outputs_are_those_of_one_job, test_translation_error_behind_running_compilers,
-           test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])
+           test_the_next_project_begins_beside_the_last_one, test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])

@@ -1,9 +1,9 @@
 #!/usr/bin/env python3
 """Lets the system calls of whole runs go wrong, one after the other, and looks at what the runs leave.
 
-campaign.py BINARY [--short] [--markdown]
+campaign.py BINARY [--short] [--markdown] [KIND...]
 
-Each row of the table is a kind of run and a kind of fault. For each call of that kind (of `--short`: for some) a fresh
+KIND names a kind of run ("build, 4 jobs"); without one come all, and what is tried of them together. Each row of the table is a kind of run and a kind of fault. For each call of that kind (of `--short`: for some) a fresh
 workspace is made and the run is disturbed at that call. What must hold afterwards:
   - the run did not end in a signal, an abort or without an end (but for those that were killed);
   - each file that it writes is as before or as it is to be, never a part of it;
@@ -36,12 +36,15 @@ from workspace_fixture import Workspace  # noqa: E402
 
 TRANSLATE = ["mode=build", "compiler=gcc", "translateOnly=true"]
 BUILD = ["mode=build", "compiler=gcc"]
+JOBS = [*BUILD, "jobs=4", "keepGoing=true", 'launcher={"lead"}']
 VISUAL = ["mode=build", "compiler=vc14", "platform=\"Win64\""]
 RUNS = {  # name: arguments, and what stands there before
     "translate": (TRANSLATE, None),
     "translate again": (TRANSLATE, TRANSLATE),
     "build": (BUILD, None),
     "build again": (BUILD, BUILD),
+    "build, 4 jobs": (JOBS, None),
+    "build again, 4 jobs": (JOBS, JOBS),
     "build, vc14": (VISUAL, None),
     "build again, vc14": (VISUAL, VISUAL),
     "gen, gcc": (["mode=gen", "compiler=gcc"], None),
@@ -126,7 +129,8 @@ class Kind:
         else:
             self.before = {}
         calls = self.start / "tools/calls"
-        calls.unlink(missing_ok=True)
+        shutil.rmtree(calls, ignore_errors=True)
+        calls.mkdir()
         end = self.copy(folder / "undisturbed")
         counts = folder / "counts"
         done = run(binary, end, self.arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts))
@@ -134,7 +138,7 @@ class Kind:
         self.expected, self.said = outputs(end), lines(done.stdout)
         self.counts = {call: int(count) for call, count in (line.split() for line in counts.read_text().splitlines())}
         made = end / "tools/calls"
-        self.tools = len(made.read_text().splitlines()) if made.exists() else 0
+        self.tools = len(list(made.iterdir()))
         self.counts.update({f"keeper {call}": self.tools for call in ("fork", "send")})
         shutil.rmtree(end)
 
@@ -261,12 +265,14 @@ def rows(kind, folder, short, mounts):
         yield "disk full", [(full_disk, kind, folder / f"disk{size}", taken + 4 * size) for size in sizes]
 
 
-def all_rows(binary, library, folder, short, mounts):
+def all_rows(binary, library, folder, short, mounts, names):
     """Name of the kind of run, name of the fault and a function for each disturbed run of it."""
-    for name in RUNS:
+    for name in names or RUNS:
         kind = Kind(binary, library, folder, name)
         for fault, calls in rows(kind, folder, short, mounts):
             yield name, fault, calls
+    if names:
+        return
     kinds = {name: RUNS[name][0] for name in ("translate", "build")}
     runs = stamps.Runs(binary, stamps.build_library(folder), run, outputs)
     yield from stamps.rows(runs, folder / "build", folder, kinds, short)
@@ -284,7 +290,8 @@ def main():
     parser.add_argument("binary", type=os.path.abspath)
     parser.add_argument("--short", action="store_true", help="some calls of each kind, within two minutes")
     parser.add_argument("--markdown", action="store_true", help="the table as docs/reliability.md has it")
-    options = parser.parse_args()
+    parser.add_argument("kinds", nargs="*", metavar="KIND", help="these kinds of run alone")
+    options = parser.parse_intermixed_args()
     for number in signals.SIGNALS[:-1]:  # what runs in the background of a shell ignores some, and so would the runs
         signal.signal(number, signal.SIG_DFL)
     folder = Path(tempfile.mkdtemp(prefix="qrex-faults-"))
@@ -297,7 +304,7 @@ def main():
         if not mounts:
             print("full disks are left out: mount needs the superuser")
         with concurrent.futures.ThreadPoolExecutor(os.cpu_count()) as pool:
-            for name, fault, calls in all_rows(options.binary, library, folder, options.short, mounts):
+            for name, fault, calls in all_rows(options.binary, library, folder, options.short, mounts, options.kinds):
                 if not calls:
                     continue
                 found = [text for text in pool.map(lambda call: call[0](*call[1:]), calls) if text]

@@ -12,9 +12,10 @@ import time
 SIGNALS = [signal.SIGINT, signal.SIGQUIT, signal.SIGTERM, signal.SIGHUP, signal.SIGKILL]
 TARGETS = {"the group": os.killpg, "the tool alone": os.kill}
 ORPHAN_WRITES = 0.4  # seconds after the pause began
-# For the scripts that stand for tools, behind the line that sets $out. Each call adds a line to tools/calls.
-PAUSE = f"""echo >> tools/calls
-if [ "$(wc -l < tools/calls)" = "$PAUSE_AT" ]; then
+# For the scripts that stand for tools, behind the line that sets $out. Each call adds a folder to tools/calls.
+PAUSE = f"""call=1
+until mkdir tools/calls/$call 2> /dev/null || [ $call = 99 ]; do call=$((call + 1)); done
+if [ "$call" = "$PAUSE_AT" ]; then
   printf half > "$out"; touch tools/paused; (sleep {ORPHAN_WRITES}; printf old > "$out") & wait; exit 1
 fi
 """

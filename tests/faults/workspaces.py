@@ -49,7 +49,9 @@ def gcc():
         "tree/app/src/app.qrpj": program.replace("@dirname", "app"),
         "tree/app/src/app.cpp": '@import "zoo/zoo.h"\n$init { }\nint main() { return legs; }\n',
         "tree/app/src/more.cpp": "int more;\n",
+        "tools/lead": '#!/bin/sh\n"$@"\n',
         "tools/gcc-4": COMPILER,
+        "tools/gcc": COMPILER,  # where the other is not found because of a fault
         "tools/ar": LIBRARIAN,
         "tools/g++": LINKER,
     }
@@ -87,7 +89,7 @@ cat "$manifest" >> "$out"
 
 def visual():
     result = gcc()
-    del result["tools/gcc-4"], result["tools/ar"], result["tools/g++"]
+    del result["tools/gcc-4"], result["tools/gcc"], result["tools/ar"], result["tools/g++"]
     result.update({f"tools/{name}": "#!/bin/sh\n" + script for name, script in VISUAL_TOOLS.items()})
     result["all.qrex"] += 'PATH("Win64") = { "tools" "/usr/bin" "/bin" } INCLUDE("Win64") = { "inc" } LIB("Win64") = { "lib" }\n'
     out = '/OUT:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/$(PROJNAME).'

@@ -58,7 +58,11 @@ bool Importer::Import(LSFrame& frame, const std::string& path, const char* posit
         .WithHint(m_file.UseHint(imported));
   }
   const Nested nested(depth);
-  BringUpToDate(imported);
+  try {
+    BringUpToDate(imported);
+  } catch (const FaultyFileException&) {
+    throw FaultyFileException("not translated: it imports " + imported.SourcePath() + ", which has an error", position);
+  }
 
   // A file in progress is not translated again, so a cycle shows as a chain from the import back to this file.
   if (&imported == &m_file || imported.importClosure.Has(m_file.index)) {

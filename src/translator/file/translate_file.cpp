@@ -102,15 +102,27 @@ void Begin(ScannedFile& file, Work work) {
     if (file.isKept && file.place == 0) TakePlaces(file);
     return;
   }
-  if (file.state == TranslationState::Failed) file.TakeBack();
+  const bool keepsGoing = file.host.Settings().keepGoing;
+  if (file.state == TranslationState::Failed) {
+    if (keepsGoing) throw FaultyFileException("", nullptr);
+    file.TakeBack();
+  }
   file.state = TranslationState::Running;
+  file.host.TranslationBegins(file);
   try {
     work(file);
+  } catch (const IException& exception) {
+    file.state = TranslationState::Failed;
+    if (!keepsGoing) throw;
+    file.host.TellFault(file, exception);
+    throw FaultyFileException("", nullptr);
   } catch (...) {
     file.state = TranslationState::Failed;
+    file.host.TranslationEnds(file);
     throw;
   }
   file.state = TranslationState::Done;
+  file.host.TranslationEnds(file);
 }
 
 }  // namespace

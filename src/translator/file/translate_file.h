@@ -6,8 +6,15 @@
 
 namespace qrex {
 
+// The translation of a file failed, in a run that keeps going: the error has been told, and nothing is to be done.
+class FaultyFileException : public LexScannerException {
+ public:
+  using LexScannerException::LexScannerException;
+};
+
 // Translates the file and all that it imports, each once per run, and writes the output when `needsWriting` is set (and
-// clears it). A file of a kind that is not translated is copied then.
+// clears it). A file of a kind that is not translated is copied then. In a run that keeps going a file that has an
+// error, or imports one that has, raises a FaultyFileException, however often it is asked for.
 void BringUpToDate(ScannedFile& file);
 
 // The same of a translation that has not begun, but for the output: the generated text goes to `target`, with line

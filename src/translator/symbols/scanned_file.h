@@ -49,7 +49,12 @@ class TranslationHost {
   virtual size_t NextFileIndex() = 0;  // 0, 1, 2, ...: given to each ScannedFile as it is made
   virtual std::vector<const ScannedFile*> FilesOfProject() const = 0;  // those met so far, by path
   virtual void Tell(const Message& message) = 0;
+  // In a run that keeps going: what ended the translation of the file.
+  virtual void TellFault(const ScannedFile& file, const IException& exception) = 0;
   virtual void TakenBack(ScannedFile& file) = 0;  // ahead of it: nothing that the file holds may be kept
+  // Around the translation of a file, which has those of its imports within it.
+  virtual void TranslationBegins(const ScannedFile&) {}
+  virtual void TranslationEnds(const ScannedFile&) {}
   // In the scanned file whose source text holds the position; false when none does.
   virtual bool FindSourcePlace(const char* position, SourcePlace& place) const = 0;
 };

@@ -1,0 +1,15 @@
+# cmake -DSOURCE=src/report -DOUTPUT=FILE.cpp -P embed.cmake: the parts of the page as constants.
+function(embed name)
+  set(text "")
+  foreach(file ${ARGN})
+    file(READ ${SOURCE}/${file} part)
+    string(APPEND text "${part}")
+  endforeach()
+  set(constants "${constants}const std::string_view ${name} = R\"~page~(${text})~page~\";\n" PARENT_SCOPE)
+endfunction()
+
+set(constants "")
+embed(kPageHtml page.html)
+embed(kPageStyle page.css)
+embed(kPageScript page_model.js page_timeline.js page_tabs.js)
+file(WRITE ${OUTPUT} "#include \"report/page_parts.h\"\n\nnamespace qrex {\n\n${constants}\n}  // namespace qrex\n")

@@ -1,0 +1,36 @@
+// What a run reads and what comes of it, for the tools that call it: as a dependency file in the syntax of make.
+//
+//   app.d qrexsource/x64/Debug/app/src/app.cpp: app.qrex tree/app/src/app.cpp
+//   app.qrex:
+//   tree/app/src/app.cpp:
+//
+// with a line for each file behind the colon. It is one rule, since what is stale is the tool's own business: whoever
+// calls it need only know whether to. The file is the first of its targets, and bears the time at which the run began:
+// so a make file that includes it has it made by a rule for it, and what changes during the run makes it stale. The
+// empty rules let make go on when a file is gone. Names are escaped as compilers do, whose files make and ninja read.
+#pragma once
+
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "workspace/workspace.h"
+
+namespace qrex {
+
+// Whether a build translates files of the project, and this one of such a project: of one that comes built the headers.
+bool IsTranslated(const Project& project);
+bool IsTranslated(const ProjectFile& file);
+// What the run's mode reads: configuration, workspaces, projects, what these import, and the sources of translated
+// projects. Each once, in the order of reading.
+std::vector<std::string> InputsOf(const Workspace& workspace);
+// Folders whose entries decide what the projects list. That of the run is not among them: its entries change anyway.
+std::vector<std::string> ListedFolders(const ConfigSettings& settings);
+// What is up to date behind a build. Objects and targets only where the run makes them.
+std::vector<std::string> OutputsOf(const Workspace& workspace);
+
+std::string DepfileName(std::string_view path);
+// Writes what the key names, if anything; `generated`: the files of mode = gen. False, with a message, when it fails.
+bool WriteDepfile(const Workspace& workspace, const std::vector<std::string>& generated);
+
+}  // namespace qrex

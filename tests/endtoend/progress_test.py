@@ -1,0 +1,154 @@
+#!/usr/bin/env python3
+"""The status line of a build on a terminal, and messages of tools in colours there: seen through a pseudo terminal."""
+
+import fcntl
+import os
+import pty
+import re
+import signal
+import struct
+import subprocess
+import sys
+import termios
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+
+# Prints a warning, an error and a note, each with the lines that compilers add, where the source asks for it.
+COMPILER = r"""#!/bin/bash
+rsp=${2#@}; read -r text < "$rsp"
+object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
+case $(cat "$source") in
+  *slow*) sleep 0.3;;
+  *warned*) printf '%s:1:5: warning: odd [-Wodd]\n    1 | int warned;\n      |     ^~~~~~\n' "$source" >&2;;
+  *wrong*) printf '%s:1:5: error: bad\n%s:1:1: note: here\n' "$source" "$source" >&2; exit 1;;
+esac
+cp "$source" "$object"
+"""
+ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
+LINKER = '#!/bin/sh\nsleep 2.4; echo "ld: told ahead of the end"; [ ! -e fail ] || exit 1; : > out/lib/x64/Debug/app\n'
+PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n%s{ "src" { %s } }\n'
+FILES = {
+    "all.qrex": SETTINGS, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "core" "app" }\n',
+    "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER, "tools/g++": LINKER, "inc/.keep": "",
+    "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "", '"slow.cpp" "odd.cpp" "core.cpp"'),
+    "tree/core/src/slow.cpp": "int slow;\n", "tree/core/src/odd.cpp": "int warned;\n", "tree/core/src/core.cpp": "int core;\n",
+    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" }\n', '"app.cpp"'),
+    "tree/app/src/app.cpp": "int app;\n",
+}
+STATUS = re.compile(r"\[\d+/\d+\] (\d+ running, )?\d+:\d\d(, [^\x1b\r]*)?")
+
+
+def on_terminal(workspace, *arguments, columns=80, until=None, kill=None, **environment):
+    """What a run writes to a terminal, and its exit status. `until`: bytes, behind which the signal `kill` is sent."""
+    terminal, its_end = pty.openpty()
+    fcntl.ioctl(its_end, termios.TIOCSWINSZ, struct.pack("HHHH", 24, columns, 0, 0))
+    variables = {name: value for name, value in {**os.environ, "TERM": "xterm", **environment}.items() if value is not None}
+    process = subprocess.Popen([workspace.binary, "all.qrex", *arguments], cwd=workspace.folder, stdin=its_end, stdout=its_end,
+                               stderr=its_end, env=variables)
+    os.close(its_end)
+    output = b""
+    while True:
+        try:
+            part = os.read(terminal, 65536)
+        except OSError:  # the last writer has closed it
+            break
+        if not part:
+            break
+        output += part
+        if until and until in output:
+            os.kill(process.pid, kill)
+            until = None
+    os.close(terminal)
+    return output.decode().replace("\r\n", "\n"), process.wait(timeout=60)
+
+
+def shown(output):
+    """What stands on the terminal in the end."""
+    lines, column = [""], 0
+    for part in re.findall(r"\x1b\[\d*(?:;\d+)*[A-Za-z]|.", output, re.DOTALL):
+        if part == "\n":
+            lines.append("")
+            column = 0
+        elif part == "\r":
+            column = 0
+        elif part == "\x1b[K":
+            lines[-1] = lines[-1][:column]
+        elif not part.startswith("\x1b"):
+            lines[-1] = lines[-1][:column] + part + lines[-1][column + 1:]
+            column += 1
+    return "\n".join(lines)
+
+
+def comparable(text):
+    return re.sub(r"\.{3,} *[\d.]+ ms|    hint: .*\n|argv\[\d\] = .*\n", "", text)
+
+
+def statuses(output):
+    return [match.group() for match in STATUS.finditer(output)]
+
+
+def fresh(workspace):
+    workspace.shell("rm -rf x64 out qrexsource")
+
+
+@in_workspace(FILES)
+def test_line_is_shown_and_gone(workspace):
+    piped = workspace.run("all.qrex", "jobs=2")
+    lacks(piped, "\x1b")
+    fresh(workspace)
+    output, status = on_terminal(workspace, "jobs=2")
+    equal(status, 0)
+    equal(comparable(shown(output)), comparable(piped))  # what the linker printed stands whole in it, too
+    lines = statuses(output)
+    assert lines[0].startswith("[0/6] "), lines  # the second project is counted ahead of its begin
+    holds("\n".join(lines), "1 running, 0:00, core/src/slow.cpp", "linking libcore.a", "[5/6] 1 running, 0:0", ", linking app (0:02)")
+    for line in output.split("\n"):  # what stood there was cleared ahead of each text
+        lacks(re.sub(r"[^\r]*\r\x1b\[K", "", line).removesuffix(statuses(line)[-1] if statuses(line) else ""), "running")
+    lacks(on_terminal(workspace, "jobs=2")[0], "\x1b")  # nothing to do
+
+
+@in_workspace(FILES)
+def test_terminals_that_take_less(workspace):
+    workspace.write("tools/g++", LINKER.replace("sleep 2.4; ", ""))
+    piped = comparable(workspace.run("all.qrex"))
+    for kind in ("dumb", "", None):
+        fresh(workspace)
+        equal(comparable(on_terminal(workspace, TERM=kind)[0]), piped)
+    for columns in (4, 16, 34):
+        fresh(workspace)
+        output = on_terminal(workspace, columns=columns)[0]
+        drawn = re.findall(r"(\[\d[^\r\n\x1b]*)(?=\r\x1b\[K)", output)
+        assert all(len(line) < columns for line in drawn) and bool(drawn) == (columns > 5), output
+        equal(comparable(shown(output)), piped)
+
+
+@in_workspace({**FILES, "tree/core/src/core.cpp": "int wrong;\n"})
+def test_messages_of_tools_are_coloured(workspace):
+    piped = workspace.run("all.qrex")
+    holds(piped, "1 warnings, 1 errors")
+    for environment, is_coloured in (({}, True), ({"NO_COLOR": ""}, True), ({"NO_COLOR": "1"}, False)):
+        fresh(workspace)
+        output = on_terminal(workspace, **environment)[0]
+        assert statuses(output)
+        if is_coloured:
+            holds(output, "\x1b[1;35mwarning\x1b[m: odd", "      |     \x1b[1;32m^~~~~~\x1b[m\n", "\x1b[1;31merror\x1b[m: bad",
+                  "\x1b[1;36mnote\x1b[m: here")
+        else:
+            lacks(output, "\x1b[m")
+        equal(comparable(shown(output)), comparable(piped))  # so they are found in it, and followed back, as ever
+
+
+@in_workspace(FILES)
+def test_signals_leave_no_line(workspace):
+    for number, status in ((signal.SIGTERM, -signal.SIGTERM), (signal.SIGHUP, -signal.SIGHUP)):
+        fresh(workspace)
+        output, ended = on_terminal(workspace, "jobs=2", until=b"slow.cpp", kill=number)
+        equal(ended, status)
+        assert shown(output).endswith("\n"), shown(output)
+        workspace.run("all.qrex", "jobs=2")  # which waits for the ends of the tools
+
+
+run_tests([test_line_is_shown_and_gone, test_terminals_that_take_less, test_messages_of_tools_are_coloured,
+           test_signals_leave_no_line])

@@ -1,0 +1,235 @@
+#!/usr/bin/env python3
+"""What a build leaves to be looked at: the trace, and the page, which a browser shows."""
+
+import json
+import os
+import re
+import signal
+import subprocess
+import sys
+import time
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from browser_fixture import Browser, with_selenium  # noqa: E402
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+
+with_selenium()
+
+# Takes as long as the source says, and prints a warning or an error where it says so.
+COMPILER = r"""#!/bin/bash
+rsp=${2#@}; read -r text < "$rsp"
+object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
+seconds=$(sed -n 's/.*slow \([0-9.]*\).*/\1/p' "$source"); sleep "${seconds:-0}"
+grep -n warned "$source" | sed "s|^\([0-9]*\):.*|$source:\1:5: warning: odd <b>bold</b>|" >&2
+if grep -q wrong "$source"; then echo "$source:1:5: error: bad" >&2; exit 1; fi
+if grep -q mute "$source"; then exit 3; fi
+cp "$source" "$object"
+"""
+ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
+LINKER = '#!/bin/sh\nsleep 0.1; : > out/lib/x64/Debug/app\n'
+PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n%s{ %s "src" { %s } }\n'
+FILES = {
+    "all.qrex": SETTINGS + "jobs = 2\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "core" "app" }\n',
+    "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER, "tools/g++": LINKER,
+    "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "", '"c.h"', '"one.cpp" "two.cpp" "core.cpp"'),
+    "tree/core/c.h": "$enum+ E { e1 };\n",
+    "tree/core/src/one.cpp": '@import "core/c.h"\nint one;  // slow 0.3\n',
+    "tree/core/src/two.cpp": '@import "core/c.h"\nint two;  // slow 0.2, warned\n',
+    "tree/core/src/core.cpp": "int core;\n",
+    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" }\n', "", '"app.cpp"'),
+    "tree/app/src/app.cpp": '@import "core/c.h"\nint main() {}\n',
+}
+TRACE, REPORT = 'buildTrace="out/trace.json"', 'report="out/report.html"'
+HOSTILE = "core/src/</script><b>.cpp"
+
+
+def spans(workspace):
+    """Of the trace: by what each is about and its category, begin and end in milliseconds, slot, arguments."""
+    events = json.loads(workspace.path("out/trace.json").read_text())["traceEvents"]
+    names = {event["tid"]: event["args"]["name"] for event in events if event["ph"] == "M"}
+    found = {}
+    for event in events:
+        if event["ph"] == "X":
+            begin = event["ts"] / 1000
+            found[event["name"], event["cat"]] = (begin, begin + event["dur"] / 1000, names[event["tid"]], event["args"])
+    return found
+
+
+def page_data(workspace):
+    text = workspace.path("out/report.html").read_text()
+    return json.loads(re.search(r'<script type="application/json" id="data">(.*?)</script>', text, re.DOTALL).group(1))
+
+
+def counted(log):
+    """Warnings and errors, as the last line has them."""
+    found = re.search(r"Completed with (\d+) warnings, (\d+) errors", log)
+    return (int(found.group(1)), int(found.group(2))) if found else (0, 0)
+
+
+def compiled(workspace):
+    return {name: span[3].get("why") for (name, category), span in spans(workspace).items() if category == "compiler"}
+
+
+@in_workspace(FILES)
+def test_trace_tells_what_ran_when_and_why(workspace):
+    piped = workspace.run("all.qrex")
+    workspace.shell("rm -rf x64 out qrexsource")
+    log = workspace.run("all.qrex", TRACE)
+    equal(*(re.sub(r"\.{3,} *[\d.]+ ms|argv.*\n", "", text) for text in (log, piped)))
+    found = spans(workspace)
+    one, two = (found[f"core/src/{name}.cpp", "compiler"] for name in ("one", "two"))
+    assert 300 <= one[1] - one[0] < 600 and two[0] < one[1] and {one[2], two[2]} == {"slot 1", "slot 2"}, found
+    archive, link = found["out/lib/x64/Debug/libcore.a", "linker"], found["out/lib/x64/Debug/app", "linker"]
+    assert one[1] <= archive[0] and archive[1] <= link[0], found
+    equal(link[3], {"project": "app", "output": "out/lib/x64/Debug/app", "why": "it was missing"})
+    time.sleep(0.02)
+    workspace.write("tree/core/c.h", "$enum+ E { e1, e2 };\n")
+    workspace.run("all.qrex", TRACE)
+    equal(compiled(workspace), dict.fromkeys(("core/src/one.cpp", "core/src/two.cpp", "app/src/app.cpp"), "tree/core/c.h was newer"))
+    workspace.run("all.qrex", TRACE)
+    equal(spans(workspace), {})
+
+
+@in_workspace(FILES)
+def test_trace_of_a_run_that_fails(workspace):
+    workspace.write("tree/core/src/one.cpp", "wrong\n")
+    workspace.run("all.qrex", TRACE)
+    equal(spans(workspace)["core/src/one.cpp", "compiler"][3]["failed"], True)
+    workspace.write("tree/app/src/app.cpp", "$class+ Broken {\n")
+    workspace.run("all.qrex", TRACE, status=1)
+    equal(list(compiled(workspace)), ["core/src/one.cpp"])
+    workspace.write("tree/core/src/one.cpp", "slow 30\n")
+    with subprocess.Popen([workspace.binary, "all.qrex", TRACE], cwd=workspace.folder, stdout=subprocess.PIPE, text=True,
+                          start_new_session=True) as run:
+        while not workspace.path("x64/Debug/core/one.o.rsp").exists():
+            time.sleep(0.01)
+        os.killpg(run.pid, signal.SIGINT)
+        holds(run.communicate(timeout=60)[0], "Interrupted")
+    holds(str(spans(workspace)), "core/src/one.cpp")
+    workspace.write("tree/core/src/one.cpp", "mute\n")
+    log = workspace.run("all.qrex", REPORT, "keepGoing=true", status=1)
+    found = page_data(workspace)
+    equal((found["completed"], found["warnings"], found["errors"]), (True, *counted(log)))
+    errors = {message["text"]: message for message in found["messages"] if message["severity"] == "error"}
+    mute, broken = "core/src/one.cpp: the tool ended with status 3", "error : @import of IObject.h required"
+    equal((set(errors), len(errors)), ({mute, broken}, found["errors"]))
+    equal((errors[broken]["path"], errors[broken]["lines"]), ("app/src/app.cpp", [[1, "$class+ Broken {"]]))
+    workspace.run("all.qrex", REPORT, status=1)
+    equal(page_data(workspace)["completed"], False)
+
+
+@in_workspace(FILES)
+def test_files_that_cannot_be_written(workspace):
+    workspace.write("file", "")
+    holds(workspace.run("all.qrex", 'buildTrace="file/trace.json"', status=1),
+          "Error: File error (file/trace.json)", "Completed with 1 warnings")
+    lacks(workspace.run("all.qrex", TRACE, "mode=clean"), "trace.json\n")
+    assert not workspace.path("out/trace.json").exists()
+
+
+def shown_steps(browser):
+    """What the timeline shows undimmed, by the file or output of each."""
+    return sorted(browser.run("""return [...document.querySelectorAll("rect.step:not(.dim)")].map((rect) => {
+        const span = spans[rect.dataset.span];
+        return `${span.kind} ${nameOf(span)}`;
+    })"""))
+
+
+def hostile_files():
+    project = "tree/core/src/core.qrpj"
+    changed = {project: FILES[project].replace('"core.cpp"', '"core.cpp" "<" { "script><b>.cpp" }'),
+               f"tree/{HOSTILE}": '@import "core/c.h"\nint hostile;  // warned\n', "tree/core/src/core.cpp": "int core;\nwrong\n"}
+    return {**FILES, **changed}
+
+
+@in_workspace(hostile_files)
+def test_page_in_a_browser(workspace):
+    with Browser() as browser:
+        log = workspace.run("all.qrex", REPORT)
+        browser.open(workspace.path("out/report.html"))
+        look_at_figures(browser, log)
+        look_at_messages(browser)
+        filter_by_click(browser)
+        go_by_keys(browser)
+        look_at_narrow_page(browser)
+        time.sleep(0.02)
+        workspace.write("tree/core/c.h", "$enum+ E { e1, e2 };\n")
+        workspace.run("all.qrex", REPORT)
+        browser.open(workspace.path("out/report.html"), "headers")
+        equal(re.sub(r"changed .*|[\d.]+ m?s", "", "".join(browser.texts("#panel-headers tbody tr"))).split(),
+              ["core/c.h", "4", "objects", "4", "objects"])
+        browser.go("files")
+        holds("\n".join(browser.texts("#panel-files tbody tr")), "core/c.h", "core/src/one.cpp", "tree/core/c.h was newer (")
+        equal(browser.console(), [])
+        equal(set(browser.requests()), {f"file://{workspace.path('out/report.html')}"})
+
+
+def look_at_figures(browser, log):
+    figures = dict(zip(browser.texts("#figures dt"), browser.texts("#figures dd")))
+    equal((int(figures["Warnings"]), int(figures["Errors"])), counted(log))
+    milliseconds = float(re.search(r"Completed.*?([\d.]+) ms", log).group(1))
+    assert abs(browser.run("return data.total") / 1000 - milliseconds) < 50, (figures, milliseconds)
+    equal((figures["Objects"], figures["Slots"]), ("5", "2"))
+    equal(browser.texts("#verdict"), ["Completed with errors"])
+
+
+def look_at_messages(browser):
+    browser.go("messages")
+    told = browser.texts(".messages li")
+    equal(len(told), sum(int(number) for number in browser.texts("#figure-errors, #figure-warnings")))
+    holds(told[0], "error", "tree/core/src/core.cpp:1", "bad", "qrexsource/x64/Debug/core/src/core.cpp:1", "1int core;", "2wrong")
+    holds("".join(told), "odd <b>bold</b>")
+    equal(browser.texts(".messages b"), [])
+    equal(browser.run("return document.scripts.length"), 2)
+
+
+def filter_by_click(browser):
+    browser.go("files")
+    holds("\n".join(browser.texts("#panel-files th a")), HOSTILE)
+    browser.click('a[href$="one.cpp"]')
+    equal(shown_steps(browser), ["compile core/src/one.cpp", "translate core/src/one.cpp"])
+    holds(browser.texts(".filter")[0], "core/src/one.cpp")
+    browser.driver.back()
+    equal(browser.texts('[aria-selected="true"]'), ["Files"])
+    browser.click('a[href$="c.h"]')
+    equal([step for step in shown_steps(browser) if "compile" in step],
+          [f"compile {name}" for name in ("app/src/app.cpp", HOSTILE, "core/src/one.cpp", "core/src/two.cpp")])
+    browser.click(".filter a")
+    equal(browser.texts(".filter"), [])
+    browser.go(f"timeline/{HOSTILE}")
+    equal(shown_steps(browser), [f"compile {HOSTILE}", f"translate {HOSTILE}"])
+    browser.go("timeline")
+
+
+def go_by_keys(browser):
+    right, left, down, enter, escape = "\ue014", "\ue012", "\ue015", "\ue007", "\ue00c"
+    browser.press(".scroller", right)
+    first = browser.texts(".told")[0]
+    holds(first, "translated in", "why: no earlier build")
+    browser.press(".scroller", right, right, left, left, "+", "-")
+    equal(browser.texts(".told")[0], first)
+    browser.press(".scroller", down)
+    holds(browser.texts(".told")[0], "compiled in", "slot 1")
+    browser.press(".scroller", enter)
+    holds(browser.texts(".filter")[0], browser.texts(".told a")[0])
+    browser.press(".scroller", escape)
+    equal(browser.texts(".filter"), [])
+    browser.press("#tab-timeline", right)
+    equal(browser.run("return document.activeElement.id"), "tab-files")
+    equal(browser.texts('[aria-selected="true"]'), ["Files"])
+    nameless = """return [...document.querySelectorAll("a, button, input, [role]")].filter((element) =>
+        !(element.getAttribute("aria-label") || element.getAttribute("aria-labelledby") || element.textContent.trim())).length"""
+    equal(browser.run(nameless), 0)
+
+
+def look_at_narrow_page(browser):
+    browser.resize(400, 800)
+    for tab in ("timeline", f"timeline/{HOSTILE}", "files", "headers", "messages"):
+        browser.go(tab)
+        assert browser.run("return document.documentElement.scrollWidth") <= 400, tab
+    browser.resize(1280, 900)
+
+
+run_tests([test_trace_tells_what_ran_when_and_why, test_trace_of_a_run_that_fails, test_files_that_cannot_be_written,
+           test_page_in_a_browser])
