@@ -88,7 +88,7 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
     TraceWriter() << "No dependency file " << dependencyFile << "\n";
   }
   if (!settings.translateOnly) CreateDirectories(paths.Intermediate(), true);
-  const size_t knownFiles = FileCount();
+  m_savedFiles = FileCount();
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (settings.fingerprints) m_prints.emplace(*this, dependencyFile);
   if (dependencyFileLoaded || m_prints) ReadTimes();
@@ -103,7 +103,7 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
     }
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
-  if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, knownFiles);
+  if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, m_savedFiles);
 }
 
 // What the steps of an unchanged project ask for, at once: many files are waited for together.
@@ -313,6 +313,14 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   return TargetStep(*this, target, inputs);
 }
 
+// Nothing was translated, or met for the first time: the dependency file would hold what it holds.
+bool ProjectBuilder::IsAsSaved() const {
+  return dependencyFileLoaded && FileCount() == m_savedFiles && !m_hasStaleFiles && !registerMap.dirty &&
+         !unregisterMap.dirty && std::none_of(scannedByPath.begin(), scannedByPath.end(), [](const auto& file) {
+           return file.second->HasBegun();
+         });
+}
+
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
 void ProjectBuilder::Save() {
   if (registerMap.dirty || unregisterMap.dirty) {
@@ -321,7 +329,8 @@ void ProjectBuilder::Save() {
     }
   }
   if (m_hasStaleFiles) ForgetUnsettledTails(*this);
-  SaveDependencyFile(*this, m_dependencyFile);
+  const bool isSaved = IsAsSaved() && !platform::IsLink(m_dependencyFile) && TouchFile(m_dependencyFile, false);
+  if (!isSaved) SaveDependencyFile(*this, m_dependencyFile);
   if (m_prints) m_prints->Save();
   if (settings.observer) settings.observer->ProjectEnds(*this);
 }

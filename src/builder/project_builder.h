@@ -41,6 +41,7 @@ class ProjectBuilder : public BuildFiles {
 
   void WriteHeading(std::string_view end) const;
   void RunSteps(const ProjectFile* singleFile);
+  bool IsAsSaved() const;
   void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
@@ -65,6 +66,7 @@ class ProjectBuilder : public BuildFiles {
   std::string m_dependencyFile;
   std::string m_linked;                               // the target, while it is
   std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
+  size_t m_savedFiles = 0;                            // that the dependency file knew
   bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
   bool m_hasFailed = false;                           // a step has
   bool m_hasFaultyFiles = false;
