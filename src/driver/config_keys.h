@@ -53,6 +53,8 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"keepGoing", &ConfigSettings::keepGoing, "go on behind a translation error, tell all of them, end with status 1"},
     {"commandFiles", &ConfigSettings::commandFiles,
      "compilers read their options in response files, else on command lines"},
+    {"compileCommands", &ConfigSettings::compileCommands,
+     "write compile_commands.json, for clangd, clang-tidy and others"},
 };
 
 inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {

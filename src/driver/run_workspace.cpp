@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "driver/compile_commands.h"
 #include "driver/depfile.h"
 #include "driver/listing.h"
 #include "driver/observers.h"
@@ -446,7 +447,7 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (loaded) *loaded = run;
   RunObservers observers(settings);
   observers.Expect(run->Loaded());
-  const bool succeeded = run->LoadAll() && run->Run(timer);
+  const bool succeeded = run->LoadAll() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
   return observers.End(run->IsCompleted()) && succeeded;
 }
 
