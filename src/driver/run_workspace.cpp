@@ -37,7 +37,7 @@ class WorkspaceRun {
   explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
   bool LoadAll();
   bool Run(ScopeTimer& timer);
-  const Workspace& Loaded() const { return m_workspace; }
+  Workspace& Loaded() { return m_workspace; }
   bool IsCompleted() const { return m_isCompleted; }  // else an error has ended it early
 
  private:
@@ -456,6 +456,26 @@ bool ListWorkspace(ConfigSettings& settings, std::string& list) {
   WorkspaceRun run(settings);
   if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
   list = ListingOf(run.Loaded());
+  return true;
+}
+
+bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings);
+  if (!run.LoadAll()) return false;
+  PositionFilter filter(run.Loaded(), follow);
+  if (positions.empty()) filter.Run();
+  std::string text;
+  for (const std::string& position : positions) {
+    const auto followed = filter.Rewritten(position);
+    if (!followed) {
+      TraceWriter() << "Error: " << position << " is no position in a "
+                    << (follow == Follow::Back ? "file that was translated" : "source that is translated") << "\n";
+      return false;
+    }
+    text += *followed + "\n";
+  }
+  WriteToConsole(text);
   return true;
 }
 
