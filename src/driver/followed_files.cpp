@@ -46,6 +46,7 @@ size_t FindWord(std::string_view line, std::string_view word, size_t at) {
 }  // namespace
 
 int64_t FollowColumn(std::string_view from, int64_t column, std::string_view to) {
+  if (from == to) return column;
   const size_t fromIndent = IndentOf(from), toIndent = IndentOf(to);
   const size_t at = static_cast<size_t>(column) - 1;
   if (at >= fromIndent && from.substr(fromIndent) == to.substr(toIndent)) {
@@ -129,7 +130,11 @@ bool FollowedFiles::Back(const std::string& file, int64_t line, int64_t column, 
   const Followed* const followed = Find(file);
   if (!followed) return false;
   const TextLines& generated = LinesOf(followed->generatedPath);
-  if (line < 1 || line > generated.Count() || !SourceOf(*followed, line, place.path, place.line)) return false;
+  if (line < 1 || line > generated.Count()) return false;
+  if (!SourceOf(*followed, line, place.path, place.line)) {  // ahead of all that was copied, as a guard is
+    place.path = followed->scanned->SourcePath();
+    place.line = 1;
+  }
   place.isStale = followed->isStale;
   place.column = column == 0 ? 0 : FollowColumn(generated.Line(line), column, LinesOf(place.path).Line(place.line));
   return true;

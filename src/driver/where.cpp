@@ -12,7 +12,8 @@ namespace qrex {
 namespace {
 
 constexpr size_t kMostDigits = 9;
-constexpr size_t kMostEnds = 8;  // of a path that may hold what looks like the number behind it
+constexpr size_t kLongestPath = 4096;  // with the numbers behind it
+constexpr size_t kMostEnds = 8;        // of a path that may hold what looks like the number behind it
 
 bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 
@@ -85,15 +86,16 @@ void PositionFilter::AddPrefix(std::string prefix, const std::string& root) {
   if (prefix.empty()) return;
   if (!prefix.ends_with('/')) prefix += '/';
   const auto isSame = [&](const Prefix& known) { return known.text == prefix; };
-  if (std::none_of(m_prefixes.begin(), m_prefixes.end(), isSame)) m_prefixes.push_back({std::move(prefix), root});
+  if (std::none_of(m_prefixes.begin(), m_prefixes.end(), isSame)) m_prefixes.push_back({std::move(prefix), root, 0});
 }
 
-std::optional<PositionFilter::Hit> PositionFilter::NextHit(std::string_view line, size_t from) const {
+// Each prefix is searched once for each place where it stands, so that long lines take linear time.
+std::optional<PositionFilter::Hit> PositionFilter::NextHit(std::string_view line, size_t from) {
   std::optional<Hit> first;
-  for (const Prefix& prefix : m_prefixes) {
-    const size_t begin = line.find(prefix.text, from);
-    const bool isNext = begin != std::string_view::npos && (!first || begin < first->begin);
-    if (isNext) first = {begin, begin + prefix.text.size(), &prefix.root};
+  for (Prefix& prefix : m_prefixes) {
+    if (from == 0 || prefix.next < from) prefix.next = line.find(prefix.text, from);
+    const bool isNext = prefix.next != std::string_view::npos && (!first || prefix.next < first->begin);
+    if (isNext) first = {prefix.next, prefix.next + prefix.text.size(), &prefix.root};
   }
   return first;
 }
@@ -113,6 +115,7 @@ bool PositionFilter::BeginsPath(std::string_view line, size_t prefix, Mention& m
 
 bool PositionFilter::Follows(std::string_view line, const Hit& hit, Mention& mention, FollowedPlace& place) {
   if (!BeginsPath(line, hit.begin, mention)) return false;
+  line = line.substr(0, hit.pathBegin + kLongestPath);
   size_t end = hit.pathBegin;
   for (size_t tried = 0; tried < kMostEnds; ++tried, ++end) {
     end = line.find_first_of(":(\"*<>?|", end);

@@ -40,7 +40,7 @@ class PositionFilter {
     size_t begin, pathBegin;  // of the prefix, and behind it
     const std::string* root;  // the tree's root, where the prefix is one
   };
-  std::optional<Hit> NextHit(std::string_view line, size_t from) const;
+  std::optional<Hit> NextHit(std::string_view line, size_t from);
   bool Follows(std::string_view line, const Hit& hit, Mention& mention, FollowedPlace& place);
   bool BeginsPath(std::string_view line, size_t prefix, Mention& mention) const;
   std::string Printed(const Mention& mention, const FollowedPlace& place) const;
@@ -49,6 +49,7 @@ class PositionFilter {
 
   struct Prefix {
     std::string text, root;
+    size_t next = 0;  // where it stands in the line at hand
   };
   const Workspace& m_workspace;
   const Follow m_follow;
