@@ -1,5 +1,8 @@
 #include "driver/compile_commands.h"
 
+#include <string_view>
+#include <vector>
+
 #include "builder/source_command.h"
 #include "report/json_writer.h"
 #include "text/exceptions.h"
@@ -12,9 +15,25 @@ namespace {
 
 constexpr char kFileName[] = "compile_commands.json";
 
+// Precompiled headers of cl are none that clang could read. The sources include their headers all the same.
+bool IsOfPrecompiledHeader(std::string_view word) {
+  return word.starts_with("/Yu") || word.starts_with("/Yc") || word.starts_with("/Fp");
+}
+
+std::vector<std::string> WordsOf(const SourceCommand& command, CompilerKind compiler) {
+  std::vector<std::string> words = command.Words(compiler, "");
+  if (!IsVisualCpp(compiler)) return words;
+  std::vector<std::string> kept;
+  for (std::string& word : words) {
+    const bool isPath = word == command.input || (!kept.empty() && kept.back() == "/I");
+    if (isPath || !IsOfPrecompiledHeader(word)) kept.push_back(std::move(word));
+  }
+  return kept;
+}
+
 void WriteEntry(JsonWriter& json, const std::string& directory, const SourceCommand& command, CompilerKind compiler) {
   json.Line().Open('{').Member("directory", directory).Member("file", command.input).Key("arguments").Open('[');
-  for (const std::string& word : command.Words(compiler, "")) json.Value(word);
+  for (const std::string& word : WordsOf(command, compiler)) json.Value(word);
   json.Close(']').Member("output", command.object).Close('}');
 }
 

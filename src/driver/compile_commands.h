@@ -1,6 +1,7 @@
 // compile_commands.json in the folder of the run: what compiles each source of the workspace, in the form that clangd,
 // clang-tidy and others read. Each entry has the words as the build would run them, by arguments: without launchers and
-// with what response files would hold. Paths stand as in these words, from `directory` on.
+// with what response files would hold, and of cl without its precompiled headers, which clang cannot read. Paths stand
+// as in these words, from `directory` on.
 //
 // It follows from the settings and projects alone, so that it is there ahead of the first error, and the same for all
 // modes. Left out are assembler sources, and projects that come built or could not be read.
