@@ -100,7 +100,7 @@ def visual(workspace):
 
 
 def in_examples(check):
-    """Calls it with a workspace of each example that is translated, and the files of the example's own projects."""
+    """Calls it with a workspace of each example that is translated, and its files; the runtime's are among them once."""
     def test(binary):
         for folder, name in EXAMPLES.items():
             with Workspace(binary, {}) as workspace:
@@ -109,7 +109,7 @@ def in_examples(check):
                 text = workspace.path(f"{name}.qrex").read_text()
                 workspace.write(f"{name}.qrex", text.replace("../../runtime", str(ROOT / "runtime")))
                 workspace.run(f"{name}.qrex", "translateOnly=true", "compileCommands=true", "mode=build")
-                own = [entry["file"] for entry in entries(workspace) if "/Vesk/" not in entry["file"]]
+                own = [entry["file"] for entry in entries(workspace) if folder == "tour" or "/Vesk/" not in entry["file"]]
                 assert own, folder
                 check(workspace, own)
     test.__name__ = check.__name__
@@ -137,7 +137,7 @@ def clang_tidy(workspace, own):
 def clangd(workspace, own):
     server = newest("clangd", (19,))
     for file in own:
-        holds(workspace.shell(f"{server} --check='{file}' --check-locations=0 2>&1"), "compile_commands.json", "0 errors")
+        holds(workspace.shell(f"{server} --check='{file}' --check-locations=0 2>&1"), "compile_commands.json", "completed, 0 errors")
 
 
 run_tests([files, only_where_asked, visual, examples_compile, clang_tidy, clangd])
