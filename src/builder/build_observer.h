@@ -24,6 +24,7 @@ struct MakeReason {
     InputMissing,    // `file`, which it is made from, is not there
     Ahead,           // its own time is still to come, and tells nothing
     RecordsMove,     // the records of a header come to it or leave it
+    Differs,         // its command, a key or an input is not what it was, see builder/fingerprints.h
     OthersRegister,  // of a main source: what the other files register has changed
   };
   Cause cause = Cause::Missing;

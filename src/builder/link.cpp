@@ -186,6 +186,12 @@ void HintAtUnbuiltLibraries(const ProjectBuilder& builder) {
   }
 }
 
+std::string ResponseText(const ProjectBuilder& builder, const std::string& target,
+                         const std::vector<std::string>& inputs) {
+  return IsGccFamily(builder.settings.compiler) ? GccLinkerText(builder, target, inputs)
+                                                : VisualLinkerText(builder, inputs);
+}
+
 // Linker or librarian; then, for those compilers, the manifest tool and a mark of the time of its update.
 class LinkStep : public BuildStep {
  public:
@@ -283,7 +289,7 @@ std::optional<Command> LinkStep::PrepareLink() {
     return std::nullopt;
   }
   const bool isGcc = IsGccFamily(m_builder.settings.compiler);
-  m_linkerText = isGcc ? GccLinkerText(m_builder, m_target, m_inputs) : VisualLinkerText(m_builder, m_inputs);
+  m_linkerText = ResponseText(m_builder, m_target, m_inputs);
   CreateDirectories(m_target, false);
   try {
     RemoveLink(m_target);
@@ -325,6 +331,10 @@ std::optional<Command> LinkStep::PrepareMark() {
 }
 
 }  // namespace
+
+std::string LinkText(const ProjectBuilder& builder, const std::string& target, const std::vector<std::string>& inputs) {
+  return LinkCommand(builder, target) + "\n" + ResponseText(builder, target, inputs);
+}
 
 std::unique_ptr<BuildStep> TargetStep(ProjectBuilder& builder, std::string target, std::vector<std::string> inputs) {
   return std::make_unique<LinkStep>(builder, std::move(target), std::move(inputs));

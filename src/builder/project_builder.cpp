@@ -73,6 +73,7 @@ void ProjectBuilder::AddLastStep(std::function<void(bool)> whenOver) {
   scheduler.AddBehind(link, [this, whenOver = std::move(whenOver)](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
     if (succeeded && !m_linked.empty()) settings.made.insert(m_linked);
+    if (m_prints && !m_linked.empty()) m_prints->Made(m_linked, {succeeded ? m_linkPrint : 0, StampOf(m_linked)});
     if (m_hasFailed) settings.unmade.insert(&project);
     Save();
     whenOver(!m_hasFailed);
@@ -87,17 +88,22 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
     TraceWriter() << "No dependency file " << dependencyFile << "\n";
   }
   if (!settings.translateOnly) CreateDirectories(paths.Intermediate(), true);
-  const size_t knownFiles = FileCount();
+  m_savedFiles = FileCount();
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
-  if (dependencyFileLoaded) ReadTimes();
+  if (settings.fingerprints) m_prints.emplace(*this, dependencyFile);
+  if (dependencyFileLoaded || m_prints) ReadTimes();
   for (ScannedFile* file : scanned) {
-    file->needsWriting = !dependencyFileLoaded || NeedsTranslation(*this, *file);
+    const bool isStale = !dependencyFileLoaded || NeedsTranslation(*this, *file);
+    file->needsWriting = isStale || (m_prints && m_prints->DiffersTranslated(*file));
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
-    if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
+    if (settings.observer) {
+      const MakeReason differs{.cause = MakeReason::Cause::Differs};
+      settings.observer->IsStale(paths.Translated(file->file), isStale ? WhyTranslated(*this, *file) : differs);
+    }
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
-  if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, knownFiles);
+  if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, m_savedFiles);
 }
 
 // What the steps of an unchanged project ask for, at once: many files are waited for together.
@@ -113,11 +119,13 @@ void ProjectBuilder::ReadTimes() {
       if (HasObject(file->file)) asked.push_back(paths.Object(file->file));
     }
   }
-  const std::vector<int64_t> found = LastWriteTimes(asked);
+  const std::vector<FileStamp> found = StampsOf(asked);
   size_t at = 0;
   for (ScannedFile* file : scanned) {
-    file->times.source = found[at++];
-    file->times.target = found[at++];
+    file->times.source = found[at].time;
+    file->times.sourceSize = found[at++].size;
+    file->times.target = found[at].time;
+    file->times.targetSize = found[at++].size;
   }
   for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
 }
@@ -129,7 +137,7 @@ size_t ProjectBuilder::ExpectedSteps() const {
     bool isMade = file->needsWriting;
     if (RunsTools() && HasObject(file->file) && !isMade) {
       const auto object = m_objects.find(paths.Object(file->file));
-      isMade = object == m_objects.end() || object->second.time <= file->times.target;
+      isMade = object == m_objects.end() || object->second.stamp.time <= file->times.target;
     }
     if (isMade && (!RunsTools() || HasObject(file->file))) ++count;
   }
@@ -176,9 +184,15 @@ void ProjectBuilder::LearnNames(ScannedFile& file) {
 }
 
 void ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
-  const int64_t resourceTime = LastWriteTime(paths.ResourceObject(file.file));
-  if (LastWriteTime(file.SourcePath()) < resourceTime && !LiesAhead(*this, resourceTime)) return;
-  scheduler.Add(ResourceStep(*this, file), [this](bool succeeded) { m_hasFailed = m_hasFailed || !succeeded; });
+  const std::string path = paths.ResourceObject(file.file);
+  const FileStamp made = StampOf(path), source = StampOf(file.SourcePath());
+  const uint64_t print = m_prints ? m_prints->ResourcePrint(source) : 0;
+  const bool isCurrent = source.time < made.time && !LiesAhead(*this, made.time);
+  if (isCurrent && !(m_prints && m_prints->Differs(path, print, made))) return;
+  scheduler.Add(ResourceStep(*this, file), [this, path, print](bool succeeded) {
+    m_hasFailed = m_hasFailed || !succeeded;
+    if (m_prints) m_prints->Made(path, {succeeded ? print : 0, StampOf(path)});
+  });
 }
 
 void ProjectBuilder::CompileIfStale(ScannedFile& file) {
@@ -187,14 +201,20 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   Object& object = known->second;
   if (!object.source) object.source = &file.file;
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
-  if (isNew) object.time = times.LastWriteTime(path);
-  if (LatestTargetTime(*this, file) < object.time && !LiesAhead(*this, object.time)) return;
-  if (settings.observer) settings.observer->IsStale(path, WhyCompiled(*this, file, object.time));
+  if (isNew) object.stamp = times.StampOf(path);
+  const bool isStale = LatestTargetTime(*this, file) >= object.stamp.time || LiesAhead(*this, object.stamp.time);
+  if (!isStale && !(m_prints && m_prints->DiffersObject(file, object.stamp))) return;
+  if (settings.observer) {
+    const MakeReason differs{.cause = MakeReason::Cause::Differs};
+    settings.observer->IsStale(path, isStale ? WhyCompiled(*this, file, object.stamp.time) : differs);
+  }
   if (!Translate(file)) return;
-  scheduler.Add(ObjectStep(*this, file), [this, path, &object](bool succeeded) {
+  const uint64_t print = m_prints ? m_prints->ObjectPrint(file) : 0;
+  scheduler.Add(ObjectStep(*this, file), [this, path, print, &object, &file](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
-    object.time = times.LastWriteTime(path);
+    object.stamp = times.StampOf(path);
     settings.made.insert(path);
+    if (m_prints) m_prints->Made(file, {succeeded ? print : 0, object.stamp});
   });
 }
 
@@ -259,27 +279,46 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
   const std::vector<std::string> inputs = CollectLinkInputs(*this);
-  const int64_t targetTime = LastWriteTime(target);
-  auto timeOf = [&](const std::string& input) {
+  const FileStamp targetStamp = StampOf(target);
+  const int64_t targetTime = targetStamp.time;
+  auto stampOf = [&](const std::string& input) {
     const auto known = m_objects.find(input);
-    return known == m_objects.end() ? LastWriteTime(input) : known->second.time;
+    return known == m_objects.end() ? StampOf(input) : known->second.stamp;
   };
   std::vector<std::string> watched = LibrariesOfSwitches(*this);
   watched.insert(watched.end(), inputs.begin(), inputs.end());
   auto isLater = [&](const std::string& input) {
-    const int64_t time = timeOf(input);
+    const int64_t time = stampOf(input).time;
     return time > targetTime || (time == targetTime && settings.made.contains(input));
   };
   const auto later = targetTime == 0 ? watched.end() : std::find_if(watched.begin(), watched.end(), isLater);
-  if (targetTime != 0 && later == watched.end() && !LiesAhead(*this, targetTime)) return nullptr;
+  const bool liesAhead = LiesAhead(*this, targetTime);
+  const bool isCurrent = targetTime != 0 && later == watched.end() && !liesAhead;
+  if (m_prints) {
+    std::vector<FileStamp> stamps;
+    for (const std::string& input : watched) stamps.push_back(stampOf(input));
+    m_linkPrint = m_prints->TargetPrint(LinkText(*this, target, inputs), stamps);
+  }
+  if (isCurrent && !(m_prints && m_prints->Differs(target, m_linkPrint, targetStamp))) return nullptr;
   if (settings.observer) {
     using Cause = MakeReason::Cause;
-    const Cause cause = targetTime == 0 ? Cause::Missing : later == watched.end() ? Cause::Ahead : Cause::Changed;
-    settings.observer->IsStale(
-        target, {cause, cause == Cause::Changed ? *later : "", cause == Cause::Changed ? timeOf(*later) : 0});
+    const bool hasLater = targetTime != 0 && later != watched.end();
+    const Cause cause = isCurrent         ? Cause::Differs
+                        : targetTime == 0 ? Cause::Missing
+                        : hasLater        ? Cause::Changed
+                                          : Cause::Ahead;
+    settings.observer->IsStale(target, {cause, hasLater ? *later : "", hasLater ? stampOf(*later).time : 0});
   }
   m_linked = target;
   return TargetStep(*this, target, inputs);
+}
+
+// Nothing was translated, or met for the first time: the dependency file would hold what it holds.
+bool ProjectBuilder::IsAsSaved() const {
+  return dependencyFileLoaded && FileCount() == m_savedFiles && !m_hasStaleFiles && !registerMap.dirty &&
+         !unregisterMap.dirty && std::none_of(scannedByPath.begin(), scannedByPath.end(), [](const auto& file) {
+           return file.second->HasBegun();
+         });
 }
 
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
@@ -290,7 +329,9 @@ void ProjectBuilder::Save() {
     }
   }
   if (m_hasStaleFiles) ForgetUnsettledTails(*this);
-  SaveDependencyFile(*this, m_dependencyFile);
+  const bool isSaved = IsAsSaved() && !platform::IsLink(m_dependencyFile) && TouchFile(m_dependencyFile, false);
+  if (!isSaved) SaveDependencyFile(*this, m_dependencyFile);
+  if (m_prints) m_prints->Save();
   if (settings.observer) settings.observer->ProjectEnds(*this);
 }
 
@@ -301,6 +342,7 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
     if (!DeleteReporting(path)) ++errorCount;
   };
   remove(dependencyFile);
+  if (settings.fingerprints) remove(FingerprintPath(dependencyFile));
   for (const ProjectFile* file : project.files) remove(paths.Translated(*file));
 }
 

@@ -8,6 +8,7 @@
 #include <vector>
 
 #include "builder/build_files.h"
+#include "builder/project_prints.h"
 #include "builder/scheduler.h"
 
 namespace qrex {
@@ -34,12 +35,13 @@ class ProjectBuilder : public BuildFiles {
 
  private:
   struct Object {
-    int64_t time = 0;
+    FileStamp stamp;
     const ProjectFile* source = nullptr;
   };
 
   void WriteHeading(std::string_view end) const;
   void RunSteps(const ProjectFile* singleFile);
+  bool IsAsSaved() const;
   void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
@@ -59,9 +61,12 @@ class ProjectBuilder : public BuildFiles {
   std::unique_ptr<BuildStep> LinkIfStale();
   std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 
+  std::optional<ProjectPrints> m_prints;  // where the key asks for them
+  uint64_t m_linkPrint = 0;
   std::string m_dependencyFile;
   std::string m_linked;                               // the target, while it is
   std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
+  size_t m_savedFiles = 0;                            // that the dependency file knew
   bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
   bool m_hasFailed = false;                           // a step has
   bool m_hasFaultyFiles = false;

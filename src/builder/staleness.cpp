@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "builder/fingerprints.h"
 #include "platform/system.h"
 
 namespace qrex {
@@ -29,14 +30,49 @@ int64_t LatestSourceTime(BuildFiles& builder, ScannedFile& file) {
   return file.times.latestSource;
 }
 
+FileStamp TargetStamp(BuildFiles& builder, ScannedFile& file) {
+  if (file.times.target == 0) {
+    const FileStamp stamp = builder.times.StampOf(builder.paths.Translated(file.file));
+    file.times.target = stamp.time;
+    file.times.targetSize = stamp.size;
+  }
+  return {file.times.target, file.times.targetSize};
+}
+
 namespace {
 
-int64_t TargetTime(BuildFiles& builder, ScannedFile& file) {
-  if (file.times.target == 0) file.times.target = builder.times.LastWriteTime(builder.paths.Translated(file.file));
-  return file.times.target;
+int64_t TargetTime(BuildFiles& builder, ScannedFile& file) { return TargetStamp(builder, file).time; }
+
+FileStamp SourceStamp(BuildFiles& builder, ScannedFile& file) {
+  if (file.times.source == 0) {
+    const FileStamp stamp = builder.times.StampOf(file.SourcePath());
+    file.times.source = stamp.time;
+    file.times.sourceSize = stamp.size;
+  }
+  return {file.times.source, file.times.sourceSize};
+}
+
+// Of the stamps of the file and all that it imports, kept in `print`. A cycle of imports ends there.
+uint64_t PrintOf(BuildFiles& builder, ScannedFile& file, uint64_t KnownTimes::*print,
+                 FileStamp (*stamp)(BuildFiles&, ScannedFile&)) {
+  if (file.times.*print != 0) return file.times.*print;
+  RequireStack(file);
+  file.times.*print = 1;
+  PrintMixer mixer;
+  mixer.Add(stamp(builder, file));
+  for (ScannedFile* import : file.imports) mixer.Add(PrintOf(builder, *import, print, stamp));
+  return file.times.*print = mixer.Value();
 }
 
 }  // namespace
+
+uint64_t SourcePrint(BuildFiles& builder, ScannedFile& file) {
+  return PrintOf(builder, file, &KnownTimes::sourcePrint, SourceStamp);
+}
+
+uint64_t TargetPrint(BuildFiles& builder, ScannedFile& file) {
+  return PrintOf(builder, file, &KnownTimes::targetPrint, TargetStamp);
+}
 
 int64_t LatestTargetTime(BuildFiles& builder, ScannedFile& file, const ScannedFile* importer) {
   if (file.times.latestTarget != 0) return file.times.latestTarget;

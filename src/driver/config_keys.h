@@ -51,6 +51,8 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
     {"keepGoing", &ConfigSettings::keepGoing, "go on behind a translation error, tell all of them, end with status 1"},
+    {"fingerprints", &ConfigSettings::fingerprints,
+     "make again what has changed in any way: keys, switches, older files"},
     {"commandFiles", &ConfigSettings::commandFiles,
      "compilers read their options in response files, else on command lines"},
     {"compileCommands", &ConfigSettings::compileCommands,

@@ -93,9 +93,9 @@ void Progress::Estimate() {
       askers.push_back(&known->second);
     }
   }
-  const std::vector<int64_t> times = LastWriteTimes(asked);
+  const std::vector<FileStamp> stamps = StampsOf(asked);
   for (size_t i = 0; i < askers.size(); ++i) {
-    if (!m_settings.rebuildAll && times[2 * i] < times[2 * i + 1]) continue;
+    if (!m_settings.rebuildAll && stamps[2 * i].time < stamps[2 * i + 1].time) continue;
     const bool isFirst = askers[i]->expected == 0;
     askers[i]->expected += isFirst && !m_settings.translateOnly ? 2 : 1;  // with the link
   }

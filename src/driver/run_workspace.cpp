@@ -172,7 +172,9 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     }
     if (!m_queue.Finish()) return false;
   }
-  if (m_queue.Errors() == 0 && !WriteDepfile(m_workspace, m_generator.Files())) return false;
+  const bool isWhole = m_queue.Errors() == 0 && m_settings.faulty.empty() && IsWholeWorkspace(m_workspace);
+  // Who asks for a dependency file goes by the exit status: without one it is not 0.
+  const bool isTold = m_settings.depfile.empty() || (isWhole && WriteDepfile(m_workspace, m_generator.Files()));
   TraceWriter() << "\n";
   timer.Stop();
   timer.Label() << "Completed";
@@ -180,7 +182,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
   if (m_queue.Warnings() > 0 || m_queue.Errors() > 0) {
     timer.Label() << " with " << m_queue.Warnings() << " warnings, " << m_queue.Errors() << " errors";
   }
-  if (!m_settings.faulty.empty()) return false;
+  if (!m_settings.faulty.empty() || !isTold) return false;
   return m_queue.Errors() == 0 || (m_settings.mode != RunMode::Clean && !m_settings.failOnErrors);
 }
 

@@ -132,6 +132,9 @@ void WriteProjectMakeFile(TextWriter& out, const Project& project, const Project
          "# without complaining.\n"
          "-include $(OBJS:.o=.d)\n\n";
   WriteTargetRule(out, project, target);
+  if (project.settings->fingerprints) {
+    out << "# other switches stand in another make file\n$(OBJS): $(firstword $(MAKEFILE_LIST))\n\n";
+  }
   for (const ProjectFile* file : files) {
     writeObject(file);
     out << ": ";

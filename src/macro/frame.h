@@ -164,6 +164,7 @@ class LSFileFrame : public LSFrame {
   void AddOrderedImport(LSFileFrame& imported);  // the same, and its substitutions are searched
   LSVariable* FindInFrame(std::string_view name, const char* position) const override;
   void DefineSubstitution(const std::string& name, const std::string& value);  // also the macro _name_
+  const std::map<std::string, std::string, std::less<>>& Substitutions() const { return m_substitutions; }  // own ones
   const std::string* FindSubstitution(std::string_view name) const;
   bool Substitute(std::string& text) const;  // expands $(name) in place, repeatedly; true if anything changed
   void CopyFrom(const LSFileFrame& other);   // the definitions and substitutions of another frame

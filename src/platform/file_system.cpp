@@ -95,10 +95,10 @@ DirectoryTimes::~DirectoryTimes() {
   if (IsOpen()) close(m_descriptor);
 }
 
-int64_t DirectoryTimes::WriteTimeOf(const char* name) const {
+FileStamp DirectoryTimes::StampOf(const char* name) const {
   struct stat status;
   const bool isFile = fstatat(m_descriptor, name, &status, 0) == 0 && S_ISREG(status.st_mode);
-  return isFile ? FileTime(status.st_mtim) : 0;
+  return isFile ? FileStamp{FileTime(status.st_mtim), static_cast<uint64_t>(status.st_size)} : FileStamp();
 }
 
 bool CanRead(const std::string& path) {

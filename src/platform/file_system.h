@@ -32,8 +32,14 @@ Result Stat(const std::string& path, FileInfo& info);
 // The stamp that a file gets which is written now: the clock of stamps moves in ticks, behind that of the system.
 int64_t CurrentStamp();
 
-// The write times of many files of one directory: cheaper than to walk each whole path. 0 for a file that is not there
-// and for what is no plain file.
+// When a file was written, and how long it is. All 0: it is not there, or no plain file.
+struct FileStamp {
+  int64_t time = 0;  // 100 ns units since 1601
+  uint64_t size = 0;
+  bool operator==(const FileStamp&) const = default;
+};
+
+// The stamps of many files of one directory: cheaper than to walk each whole path.
 class DirectoryTimes {
  public:
   explicit DirectoryTimes(const std::string& directory);
@@ -41,7 +47,7 @@ class DirectoryTimes {
   DirectoryTimes(const DirectoryTimes&) = delete;
   DirectoryTimes& operator=(const DirectoryTimes&) = delete;
   bool IsOpen() const { return m_descriptor >= 0; }
-  int64_t WriteTimeOf(const char* name) const;
+  FileStamp StampOf(const char* name) const;
 
  private:
   int m_descriptor;

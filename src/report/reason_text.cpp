@@ -18,6 +18,8 @@ std::string ReasonText(const MakeReason& why) {
       return "its time was still to come";
     case MakeReason::Cause::RecordsMove:
       return "records of a header moved to it or from it";
+    case MakeReason::Cause::Differs:
+      return "its command, a key or an input was another one";
     case MakeReason::Cause::OthersRegister:
       return "what the other sources register has changed";
   }

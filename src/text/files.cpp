@@ -113,15 +113,17 @@ platform::Result SetReadOnly(const std::string& path, bool readOnly) {
   return platform::SetReadOnlyAttribute(Checked(path), readOnly);
 }
 
-int64_t LastWriteTime(const std::string& path) {
+FileStamp StampOf(const std::string& path) {
   platform::FileInfo info;
-  return platform::Stat(Checked(path), info) && info.isPlain ? info.writeTime : 0;
+  return platform::Stat(Checked(path), info) && info.isPlain ? FileStamp{info.writeTime, info.size} : FileStamp();
 }
+
+int64_t LastWriteTime(const std::string& path) { return StampOf(path).time; }
 
 FileTimes::FileTimes() = default;
 FileTimes::~FileTimes() = default;
 
-int64_t FileTimes::LastWriteTime(const std::string& path) {
+FileStamp FileTimes::StampOf(const std::string& path) {
   const size_t slash = path.rfind('/');
   const size_t nameBegin = slash == std::string::npos ? 0 : slash + 1;
   if (m_directories.size() > kMostDirectories) m_directories.clear();
@@ -129,17 +131,17 @@ int64_t FileTimes::LastWriteTime(const std::string& path) {
   if (!directory) directory = std::make_unique<platform::DirectoryTimes>(Checked(path).substr(0, nameBegin));
   if (!directory->IsOpen()) {
     directory.reset();  // it may be made later
-    return qrex::LastWriteTime(path);
+    return qrex::StampOf(path);
   }
-  return directory->WriteTimeOf(Checked(path).c_str() + nameBegin);
+  return directory->StampOf(Checked(path).c_str() + nameBegin);
 }
 
-std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths) {
+std::vector<FileStamp> StampsOf(const std::vector<std::string>& paths) {
   constexpr size_t kFewestOfThread = 100;
-  std::vector<int64_t> found(paths.size());
+  std::vector<FileStamp> found(paths.size());
   auto read = [&](size_t begin, size_t end) {
     FileTimes times;
-    for (size_t i = begin; i < end; ++i) found[i] = times.LastWriteTime(paths[i]);
+    for (size_t i = begin; i < end; ++i) found[i] = times.StampOf(paths[i]);
   };
   static const size_t kMostThreads = std::max(1u, std::thread::hardware_concurrency());
   const size_t threads = std::clamp<size_t>(paths.size() / kFewestOfThread, 1, kMostThreads);

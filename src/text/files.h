@@ -11,14 +11,13 @@
 #include <vector>
 
 #include "platform/buffered_file.h"
+#include "platform/file_system.h"
 #include "text/exceptions.h"
 #include "text/streams.h"
 
 namespace qrex {
 
-namespace platform {
-class DirectoryTimes;
-}
+using platform::FileStamp;
 
 bool FileExists(const std::string& path);  // a plain file that opens for reading: no directory, pipe, socket, device
 platform::Result DeleteFile(const std::string& path);
@@ -28,19 +27,21 @@ platform::Result CopyFile(const std::string& from, const std::string& to, bool f
 platform::Result CreateEmptyFile(const std::string& path, bool keepExisting);
 void CreateDirectories(const std::string& path, bool includeLast);
 platform::Result SetReadOnly(const std::string& path, bool readOnly);
+FileStamp StampOf(const std::string& path);
 int64_t LastWriteTime(const std::string& path);  // 100 ns units since 1601; 0 for a missing and for no plain file
 // The same for many files of few directories, which must stay where they are meanwhile.
 class FileTimes {
  public:
   FileTimes();
   ~FileTimes();
-  int64_t LastWriteTime(const std::string& path);
+  FileStamp StampOf(const std::string& path);
+  int64_t LastWriteTime(const std::string& path) { return StampOf(path).time; }
 
  private:
   static constexpr size_t kMostDirectories = 64;  // each takes a descriptor
   std::unordered_map<std::string, std::unique_ptr<platform::DirectoryTimes>> m_directories;
 };
-std::vector<int64_t> LastWriteTimes(const std::vector<std::string>& paths);  // of many files, by several threads
+std::vector<FileStamp> StampsOf(const std::vector<std::string>& paths);  // of many files, by several threads
 platform::Result TouchFile(const std::string& path, bool create);
 int64_t CurrentStamp();  // that a file gets which is written now, on a file system with fine stamps
 // A time that was taken by this clock as the file system would have stamped it which gave `stamp`: some keep whole

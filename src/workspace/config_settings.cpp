@@ -5,12 +5,36 @@
 #include "text/files.h"
 #include "text/numbers.h"
 #include "text/paths.h"
+#include "text/version.h"
 
 namespace qrex {
 
 const PlatformEnvironment* ConfigSettings::Environment() const {
   auto found = platformEnvironments.find(platform);
   return found == platformEnvironments.end() ? nullptr : &found->second;
+}
+
+std::string TranslationKeys(const ConfigSettings& settings) {
+  std::string text = "release=" + std::string(Version()) + "\n";
+  const auto add = [&](std::string_view name, std::string_view value) {
+    text.append(name).append("=").append(value).append("\n");
+  };
+  add("compiler", CompilerOf(settings.compiler).keyword);
+  add("config", settings.config);
+  add("platform", settings.platform);
+  add("systemName", settings.systemName);
+  add("systemProcessor", settings.systemProcessor);
+  add("systemVersion", settings.systemVersion);
+  add("sizeofPointer", settings.sizeofPointer);
+  add("defaultToDll", settings.defaultToDll ? "true" : "false");
+  add("modernCpp", settings.modernCpp ? "true" : "false");
+  add("compilableText", settings.compilableText ? "true" : "false");
+  for (const std::string& root : settings.virtualTree) add("virtualTree", root);
+  for (const auto& [name, value] : settings.context.rootFrame.Substitutions()) {
+    const bool isOfOneRun = name == "COMPILE_FILE_PATH" || name == "TARGET_DIR";
+    if (!isOfOneRun) add("$" + name, value);
+  }
+  return text;
 }
 
 void ApplyEnvironment(const PlatformEnvironment& environment) {

@@ -18,7 +18,7 @@
 
 namespace qrex {
 
-class Project;
+struct Project;
 class BuildObserver;  // builder/build_observer.h
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
@@ -62,6 +62,7 @@ struct ConfigSettings {
   std::vector<std::string> launcher;  // words ahead of compilers
   bool commandFiles = true;  // compilers are given response files; false: command lines, where they are not too long
   bool failOnErrors = false;
+  bool fingerprints = false;                    // builder/fingerprints.h
   bool keepGoing = false;                       // an error in a source ends its translation, and not the run
   std::string buildTrace;                       // the file of a trace; empty: none is written
   std::string report;                           // and that of a page
@@ -88,6 +89,9 @@ struct ConfigSettings {
   void Tell(const Message& message) const { macroWorld.messages->Take(message); }
   const PlatformEnvironment* Environment() const;  // of `platform`, or null
 };
+
+// What of the configuration decides on translations, as text: keys and variables with their values.
+std::string TranslationKeys(const ConfigSettings& settings);
 
 // Sets the process variables PATH (entries joined with the system's own separator), INCLUDE and LIB.
 void ApplyEnvironment(const PlatformEnvironment& environment);

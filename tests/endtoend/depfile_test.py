@@ -15,7 +15,7 @@ NAMES = ["a b.h", "c$d.h", "e#f.h", "g:h.h", "i\\j.h", "back\\ slash.h", "k%l.h"
 FILES = {
     "all.qrex": '@import "settings.inc"\n' + SETTINGS + 'translateOnly = true\ndepfile = "out/app.d"\n',
     "settings.inc": "modernCpp = true\n",
-    "tree/all.qrws": '"all" { "app" "lib" }\n',
+    "tree/all.qrws": '"all" { "lib" "app" { "lib" } }\n',
     "tree/app/src/app.qrpj": '$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "app"\nqrex\n@import "common.inc"\n'
                              '{ "src" { "*.h" "*.cpp" } }\n',
     "tree/common.inc": 'config { "Debug|x64" }\n',
@@ -68,8 +68,8 @@ def ninja(workspace):
 @in_workspace({**FILES, "makefile": MAKE}, "make")
 def make(workspace):
     is_asked_again(workspace, "make", "Nothing to be done")
-    holds(workspace.path("out/app.d").read_text(), "out/app.d qrexsource/x64/Debug/app/src/-minus.h", "app.cpp",
-          "qrexsource/x64/Debug/lib/lib.h out/include/lib/lib.h out/source/lib/lib.h: \\\n  all.qrex \\\n")
+    holds(workspace.path("out/app.d").read_text(), "out/app.d qrexsource/x64/Debug/lib/lib.h out/include/lib/lib.h "
+          "out/source/lib/lib.h qrexsource/x64/Debug/app/src/-minus.h", "app.cpp: \\\n  all.qrex \\\n")
 
 
 @in_workspace({**FILES, "elsewhere/none": ""})
@@ -85,12 +85,12 @@ def from_another_folder(workspace):
     holds(workspace.shell("cd elsewhere && Qrex ../all.qrex 'sourceFolder=\"..\"'", status=1), "\n../tree/lib/lib.h(2) : ")
 
 
-@in_workspace(FILES)
+@in_workspace(FILES, "g++")
 def modes_and_failures(workspace):
     """One is written behind a run that has done all that it was told, and is whole or as it was."""
     workspace.run("all.qrex", "mode=gen", "compiler=gcc")
     text = workspace.path("out/app.d").read_text()
-    holds(text, "out/app.d all.projects make_app_x64_Debug app.cbp ", " makefile ", ": \\\n  all.qrex ")
+    holds(text, "out/app.d all.projects make_lib_x64_Debug lib.cbp make_app_x64_Debug app.cbp ", " makefile ", ": \\\n  all.qrex ")
     lacks(text, "app.cpp")
     for arguments in (["mode=clean"], ["mode=show", '$COMPILE_FILE_PATH = "tree/app/src/app.cpp"']):
         workspace.write("tree/.qrwsroot", "")
@@ -99,7 +99,16 @@ def modes_and_failures(workspace):
     workspace.append("tree/lib/lib.h", "$class {\n")
     workspace.run("all.qrex", status=1)
     equal(workspace.path("out/app.d").read_text(), text)
+    workspace.write("tree/lib/lib.h", "inline int zero() { return nothing; }\n")
+    holds(workspace.run("all.qrex", "translateOnly=false", status=1), "'nothing' was not declared", " errors")
     workspace.write("tree/lib/lib.h", "inline int zero() { return 0; }\n")
+    project = workspace.path("tree/lib/src/lib.qrpj").read_text()
+    workspace.write("tree/app/src/app.cpp", "int main() {}\n")
+    workspace.replace("tree/lib/src/lib.qrpj", "qrex", "qrix")
+    output = workspace.run("all.qrex", 'workspaces = { "app" "lib" }', status=1)
+    holds(output, "lib.qrpj(3) : ", "Completed")
+    workspace.write("tree/lib/src/lib.qrpj", project)
+    equal(workspace.path("out/app.d").read_text(), text)
     holds(workspace.run("all.qrex", 'depfile="tree/all.qrws/app.d"', status=1), "Error: ", "tree/all.qrws/app.d")
 
 

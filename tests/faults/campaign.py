@@ -36,7 +36,7 @@ from workspace_fixture import Workspace  # noqa: E402
 
 TRANSLATE = ["mode=build", "compiler=gcc", "translateOnly=true"]
 BUILD = ["mode=build", "compiler=gcc"]
-JOBS = [*BUILD, "jobs=4", "keepGoing=true", 'launcher={"lead"}']
+JOBS = [*BUILD, "jobs=4", "keepGoing=true", "fingerprints=true", 'launcher={"lead"}']
 VISUAL = ["mode=build", "compiler=vc14", "platform=\"Win64\""]
 RUNS = {  # name: arguments, and what stands there before
     "translate": (TRANSLATE, None),
@@ -84,7 +84,7 @@ def outputs(folder):
         if not path.is_file() or name.startswith(INPUTS) or name.endswith((".rsp", "mtdep.bat", "out1.txt")):
             continue  # of a tool that is told what to do: the next run makes them anew
         content = path.read_bytes()
-        if name.endswith((".qrexdep", "projects.guids", "mt.dep")):
+        if name.endswith((".qrexdep", ".qrexprint", "projects.guids", "mt.dep")):
             content = b"" if content else b"empty"
         contents[name] = IDENTIFIER.sub(number, content) if HAS_IDENTIFIER.search(content) else content
     return contents
@@ -174,7 +174,7 @@ class Kind:
             raise Violation("the next run fails: " + done.stdout.decode()[-600:])
         self.compare(folder, "the next run ends with other files:")
         times = lambda: {path: path.stat().st_mtime_ns for path in folder.rglob("*") if path.is_file()
-                         and not path.name.endswith((".qrexdep", "projects.guids"))}
+                         and not path.name.endswith((".qrexdep", ".qrexprint", "projects.guids"))}
         before = times()
         run(self.binary, folder, self.arguments)
         noted = [str(path.relative_to(folder)) for path, stamp in times().items() if before.get(path) != stamp]

@@ -143,19 +143,21 @@ TEST_F(FilesTest, WhatIsNoPlainFile) {
 
 TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
   std::vector<std::string> paths;
-  std::vector<int64_t> times;
+  std::vector<FileStamp> stamps;
   for (int i = 0; i < 1500; ++i) {
     paths.push_back(std::to_string(i % 100) + "/" + std::to_string(i / 100));
-    if (i % 3 != 0) Write(paths.back(), "");
+    if (i % 3 != 0) Write(paths.back(), std::string(i, 'x'));
     if (i % 3 == 1)
       std::filesystem::last_write_time(paths.back(),
                                        std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
   }
   paths.push_back("1");
-  for (const std::string& path : paths) times.push_back(LastWriteTime(path));
-  EXPECT_EQ(times, LastWriteTimes(paths));
+  for (const std::string& path : paths) stamps.push_back(StampOf(path));
+  EXPECT_TRUE(stamps == StampsOf(paths));
+  EXPECT_EQ(FileStamp(), stamps[0]);
+  EXPECT_EQ(1, stamps[1].size);
   paths[700] = "\xff";
-  EXPECT_THROW(LastWriteTimes(paths), StringConversionException);
+  EXPECT_THROW(StampsOf(paths), StringConversionException);
 }
 
 TEST_F(FilesTest, LineEnds) {

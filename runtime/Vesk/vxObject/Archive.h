@@ -16,18 +16,17 @@ InputArchive& operator>>(InputArchive& ar, T& v);
 
 // --- Scalars
 
-template <typename T>
-void SwapBytes(T* items, std::size_t count) {
-  octet_t* bytes = reinterpret_cast<octet_t*>(items);
-  for (std::size_t i = 0; i < count; ++i, bytes += sizeof(T)) std::reverse(bytes, bytes + sizeof(T));
+inline void SwapBytes(void* items, std::size_t count, std::size_t size) {
+  octet_t* bytes = static_cast<octet_t*>(items);
+  for (std::size_t i = 0; i < count; ++i, bytes += size) std::reverse(bytes, bytes + size);
 }
 
 template <typename T>
 void WriteScalars(Archive& ar, T const* items, std::size_t count) {
-  ar.Write(items, count * sizeof(T));
+  const std::size_t size = count * sizeof(T);
+  ar.Write(items, size);
   if (ArchivesSwapBytes && !ar.m_hostOrder) {
-    octet_t* end = ar.m_bytes.data() + ar.m_bytes.size();
-    for (octet_t* item = end - count * sizeof(T); item != end; item += sizeof(T)) std::reverse(item, item + sizeof(T));
+    SwapBytes(ar.m_bytes.data() + ar.m_bytes.size() - size, count, sizeof(T));
   }
 }
 
@@ -35,7 +34,7 @@ void WriteScalars(Archive& ar, T const* items, std::size_t count) {
 template <typename T>
 void ReadScalars(InputArchive& ar, T* items, std::size_t count) {
   ar.Read(items, count * sizeof(T));
-  if (ArchivesSwapBytes && !ar.m_hostOrder) SwapBytes(items, count);
+  if (ArchivesSwapBytes && !ar.m_hostOrder) SwapBytes(items, count, sizeof(T));
 }
 
 template <typename T, typename = std::enable_if_t<IsArithmetic<T>>>

@@ -4,6 +4,7 @@
 // it.
 
 @import "Vesk/vxObject/CacheValues.h"
+#include <map>
 
 namespace vesk {
 
@@ -85,71 +86,44 @@ class DGKeyed : public Base {
 
 // --- Async: the calculation waits in a queue
 
-class DGAsyncNode : public DGNode {
- public:
-  enum EQueue { Calculation, InputOutput };
+struct DGWaitPlace : DGPlace {};
+class DGAsyncNode;
 
+struct AsyncQueues : PerThread<AsyncQueues> {
+  enum EQueue { Calculations, InputOutput };
+
+  static void Join(DGAsyncNode const& node);
+  static void Leave(DGAsyncNode const& node);
+  // Runs what waits now in this thread. Answers how many calculations ran. One that throws ends it; its node is
+  // calculated again when it is next read.
+  static ssize_t Run(EQueue queue);
+
+  NodeList<DGWaitPlace> m_waiting[2];
+};
+
+class DGAsyncNode : public DGNode, private DGWaitPlace {
+ public:
   DGAsyncNode() {}
-  DGAsyncNode(DGAsyncNode const& rhs) : DGNode(rhs) {}
+  DGAsyncNode(DGAsyncNode const& rhs) : DGNode(rhs), DGWaitPlace() {}
   DGAsyncNode& operator=(DGAsyncNode const& rhs) {
     DGNode::operator=(rhs);
     return *this;
   }
-  ~DGAsyncNode() override { Dequeue(); }
-
-  // Runs what waits now in this thread. Answers how many calculations ran. One that throws ends it; its node is
-  // calculated again when it is next read.
-  static ssize_t Run(EQueue queue) {
-    ssize_t count = 0;
-    for (std::list<DGAsyncNode const*>& waiting = Queues::Get().m_waiting[queue]; !waiting.empty(); ++count) {
-      DGAsyncNode const* node = waiting.front();
-      node->Dequeue();
-      vesk::Calculation detached(GraphState::Get(), nullptr);
-      bool isChanged;
-      try {
-        isChanged = node->CalculateOutput();
-      } catch (...) {
-        node->Invalidate(true);
-        throw;
-      }
-      if (isChanged) node->Change();
-    }
-    return count;
-  }
-  bool IsWaiting() const { return m_queues != nullptr; }
+  ~DGAsyncNode() override { AsyncQueues::Leave(*this); }
 
  protected:
   virtual bool CalculateOutput() const = 0;  // whether it changed
-  void Enqueue() const {
-    if (IsWaiting()) return;
-    Queues& queues = Queues::Get();
-    std::list<DGAsyncNode const*>& waiting = queues.m_waiting[OwnQueue()];
-    m_place = waiting.insert(waiting.end(), this);
-    m_queues = &queues;
-    queues.Use();
-  }
 
  private:
-  struct Queues : PerThread<Queues> {
-    std::list<DGAsyncNode const*> m_waiting[2];
-  };
-
-  EQueue OwnQueue() const { return HasFlag(DF_ASYNC_IO) ? InputOutput : Calculation; }
-  void Dequeue() const {
-    if (!IsWaiting()) return;
-    m_queues->m_waiting[OwnQueue()].erase(m_place);
-    std::exchange(m_queues, nullptr)->Release();
-  }
-
-  mutable Queues* m_queues = nullptr;  // where it waits
-  mutable std::list<DGAsyncNode const*>::iterator m_place;
+  friend struct AsyncQueues;
+  mutable AsyncQueues* m_queues = nullptr;  // where it waits
 };
 
 // Both queues of this thread until nothing waits.
 inline ssize_t RunAsyncCalculations() {
   ssize_t count = 0;
   for (ssize_t more = 1; more > 0; count += more) {
-    more = DGAsyncNode::Run(DGAsyncNode::Calculation) + DGAsyncNode::Run(DGAsyncNode::InputOutput);
+    more = AsyncQueues::Run(AsyncQueues::Calculations) + AsyncQueues::Run(AsyncQueues::InputOutput);
   }
   return count;
 }
@@ -176,7 +150,7 @@ template <typename N, typename C, typename O>
 class DGAsyncIndepNode : public DGCacheNode<DGAsyncNode, N, C, O> {
  protected:
   bool RecalcCache() const override {
-    this->Enqueue();
+    AsyncQueues::Join(*this);
     return false;
   }
   bool CalculateOutput() const override {
@@ -189,7 +163,7 @@ template <typename N, typename C, typename K, typename O>
 class DGKeyedAsyncIndepNode : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>, N, C, K> {
  protected:
   bool RecalcCache() const override {
-    this->Enqueue();
+    AsyncQueues::Join(*this);
     return false;
   }
   bool CalculateOutput() const override {
@@ -208,7 +182,7 @@ class DGAsyncNodeOnInput : public DGCacheNode<DGAsyncNode, N, C, O> {
   bool RecalcCache() const override {
     m_input = I();
     N::CalcInput(static_cast<N const*>(this)->_GetSelf(), m_input);
-    this->Enqueue();
+    AsyncQueues::Join(*this);
     return false;
   }
   bool CalculateOutput() const override {
@@ -230,7 +204,7 @@ class DGKeyedAsyncNodeOnInput : public DGKeyed<DGCacheNode<DGAsyncNode, N, C, O>
   bool RecalcCache() const override {
     m_input = I();
     N::CalcInput(this->_self, m_input, this->_GetKey());
-    this->Enqueue();
+    AsyncQueues::Join(*this);
     return false;
   }
   bool CalculateOutput() const override {

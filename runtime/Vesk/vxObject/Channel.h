@@ -3,9 +3,7 @@
 
 @import "Vesk/vxObject/Containers.h"
 
-#include <algorithm>
 #include <chrono>
-#include <deque>
 #include <stdexcept>
 
 namespace vesk {
@@ -61,23 +59,14 @@ class LocalChannel {
  public:
   LocalChannel();
   ~LocalChannel();
-  Channel& Client() { return m_ends[0]; }
-  Channel& Server() { return m_ends[1]; }
+  LocalChannel(LocalChannel const&) = delete;
+  void operator=(LocalChannel const&) = delete;
+  Channel& Client();
+  Channel& Server();
 
  private:
-  typedef std::deque<xvector<octet_t>> Queue;
-  class End : public Channel {
-   public:
-    End(Queue& out, Queue& in) : m_out(out), m_in(in) {}
-    void Send(xvector<octet_t> const& message) override;
-    bool Receive(xvector<octet_t>& message) override;
-
-   private:
-    Queue& m_out;
-    Queue& m_in;
-  };
-  Queue m_queues[2];
-  End m_ends[2];
+  struct Ends;
+  Ends* m_ends;
 };
 
 // The largest message that either side sends or reads, unless told otherwise.
@@ -88,9 +77,6 @@ void CheckMessageSize(std::size_t size, std::size_t limit);
 xstring TooLongText(std::size_t size, std::size_t limit);
 
 // So long from now. Any time may be given; what is over a century is one.
-inline std::chrono::steady_clock::time_point EndOf(std::chrono::milliseconds time) {
-  typedef std::chrono::milliseconds Time;
-  return std::chrono::steady_clock::now() + std::clamp<Time>(time, Time(0), std::chrono::hours(24 * 365 * 100));
-}
+std::chrono::steady_clock::time_point EndOf(std::chrono::milliseconds time);
 
 }  // namespace vesk

@@ -2,8 +2,6 @@
 // can reach it. Objects made with `$new` belong to the heap below until it is collected.
 
 @import "Vesk/vxObject/Model.h"
-#include <mutex>
-#include <unordered_set>
 
 namespace vesk {
 
@@ -34,9 +32,13 @@ struct BaseMixin : public B {
 
 // The objects made by `$new` in all threads, until they are collected or their DestroyObject is called. Each call is
 // safe in any thread, but Collect wants that no other thread changes objects meanwhile.
-class ObjectHeap : private IObjectVisitor {
+class ObjectHeap {
  public:
   static ObjectHeap& Get();
+  ObjectHeap();
+  ~ObjectHeap();
+  ObjectHeap(ObjectHeap const&) = delete;
+  void operator=(ObjectHeap const&) = delete;
 
   // `size`: the bytes of the object. A pointer into it, such as one to a base, reaches it.
   void Add(ptr<IObject> const& object, std::size_t size);
@@ -49,27 +51,8 @@ class ObjectHeap : private IObjectVisitor {
   ssize_t Collect(xvector<ptr<IObject>> const& roots);
 
  private:
-  typedef std::uintptr_t Number;
-  struct Made {
-    ptr<IObject> m_object;
-    std::size_t m_size;
-    uint64 m_serial;
-  };
-
-  static Number Address(void const* object) { return reinterpret_cast<Number>(object); }
-
-  void VisitObject(ptr<IObject> const& object) override;
-  // The object of this heap that holds the other one, as it was made.
-  ptr<IObject> WholeObject(ptr<IObject> const& object) const;
-  xvector<Made> Unreached() const;
-  // Whether the object is still there, and no other one stands in its place.
-  bool Take(Made const& made);
-
-  mutable std::mutex m_mutex;
-  std::map<Number, Made> m_objects;
-  uint64 m_lastSerial = 0;
-  std::unordered_set<void const*> m_reached;
-  xvector<ptr<IObject>> m_pending;
+  struct Objects;
+  Objects* m_objects;
 };
 
 // An object that is no IObject stays its maker's.

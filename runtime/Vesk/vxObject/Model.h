@@ -46,7 +46,7 @@ class ModelHook {
 
  private:
   // A hook's function, which stays in its place while it is called, though the hook be gone.
-  struct Called : NodePlace {
+  struct Called : DGPlace {
     Function m_function;
     std::size_t m_serial;
     ssize_t m_users = 1;  // the hook is one
@@ -129,18 +129,19 @@ void genop_OffsetValue(T* object, Path const& path, E& field, V const& value) {
   field = static_cast<E>(field + value);
 }
 
+// A hook may change the field, of which the source may be a part, and take the position away.
 template <typename T, typename E, typename V>
-void genop_CreateIntoVector(T* object, Path const& path, E& field, ssize_t at, V const* source, ssize_t count) {
-  if (!ModelHook::Any()) {
-    BeginOperation(ModelChange::Insert, object, path);
-    field.insert(field.begin() + at, source, source + count);
-    return;
-  }
-  // A hook may change the field, of which the source may be a part, and take the position away.
+void InsertHooked(T* object, Path const& path, E& field, ssize_t at, V const* source, ssize_t count) {
   const E items(source, source + count);
   BeginOperation(ModelChange::Insert, object, path);
   if (at > static_cast<ssize_t>(field.size())) throw std::out_of_range("position to insert at");
   field.insert(field.begin() + at, items.begin(), items.end());
+}
+template <typename T, typename E, typename V>
+void genop_CreateIntoVector(T* object, Path const& path, E& field, ssize_t at, V const* source, ssize_t count) {
+  if (ModelHook::Any()) return InsertHooked(object, path, field, at, source, count);
+  PathSource::OnWrite(object, path);
+  field.insert(field.begin() + at, source, source + count);
 }
 template <typename T, typename E, typename V>
 void genop_CreateIntoVector_VisitPrefs(T* object, Path const& path, E& field, ssize_t at, V const* source,

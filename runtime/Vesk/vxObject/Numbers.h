@@ -3,8 +3,7 @@
 
 @import "Vesk/vxObject/Visitors.h"
 #include <functional>
-#include <map>
-#include <typeindex>
+#include <typeinfo>
 
 namespace vesk {
 
@@ -14,15 +13,35 @@ struct WrittenObject {
   void (*m_write)(Archive&, WrittenObject const&);  // its content
 };
 
-struct WrittenObjects {
-  // An address is several objects where a struct begins with another one. Those with interfaces share the type void.
-  typedef std::pair<void const*, std::type_index> Key;
+// The numbers of objects by their addresses and types.
+class ObjectNumbers {
+ public:
+  ObjectNumbers() {}
+  ObjectNumbers(ObjectNumbers const& rhs);
+  ObjectNumbers(ObjectNumbers&& rhs) noexcept : m_table(std::exchange(rhs.m_table, nullptr)) {}
+  ObjectNumbers& operator=(ObjectNumbers rhs) noexcept {
+    std::swap(m_table, rhs.m_table);
+    return *this;
+  }
+  ~ObjectNumbers() {
+    if (m_table) Drop();
+  }
 
+  // That of an object; `next` for a new one, which has it from now on.
+  std::size_t Of(void const* object, std::type_info const& type, std::size_t next);
+
+ private:
+  struct Table;
+  void Drop();
+  Table* m_table = nullptr;
+};
+
+struct WrittenObjects {
   // Answers the number, and whether the object is new.
   std::pair<std::size_t, bool> Insert(WrittenObject const& object, std::type_info const& type);
 
   xvector<WrittenObject> m_list;
-  std::map<Key, std::size_t> m_numbers;
+  ObjectNumbers m_numbers;
   std::size_t m_next = 0;                    // the first object whose content is not written yet
   bool m_isWriting = false;                  // who set it writes the contents
   ReflectedClass const* m_record = nullptr;  // the class that was written last

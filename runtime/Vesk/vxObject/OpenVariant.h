@@ -5,22 +5,33 @@
 
 namespace vesk {
 
+// What an openvariant does that does not depend on its T. Values have their memory to themselves.
+struct AnyValue {
+  // Both throw std::logic_error or what the type's functions throw. Null of null.
+  static void* Clone(TypeOps const* ops, void const* value);
+  static void* Default(TypeOps const& ops);
+  static void Destroy(TypeOps const& ops, void* value);
+
+  // ArchiveError for a type without a name, and for what no openvariant can hold.
+  static xstring NameOf(TypeOps const* ops);
+  // Of the type that an archive names next; null for none.
+  static TypeOps const* ReadType(InputArchive& ar);
+};
+
 template <typename T>
 class openvariant {
  public:
   openvariant() {}
   template <typename U, typename = std::enable_if_t<!std::is_same<U, openvariant>::value>>
-  openvariant(U const& value) : m_ops(&GetTypeOps<U>()), m_value(Clone(m_ops, &value)) {}
-  openvariant(openvariant const& rhs) : m_ops(rhs.m_ops), m_value(Clone(m_ops, rhs.m_value)) {}
+  openvariant(U const& value) : m_ops(&GetTypeOps<U>()), m_value(AnyValue::Clone(m_ops, &value)) {}
+  openvariant(openvariant const& rhs) : m_ops(rhs.m_ops), m_value(AnyValue::Clone(m_ops, rhs.m_value)) {}
   openvariant(openvariant&& rhs) noexcept { Swap(rhs); }
   openvariant& operator=(openvariant rhs) {
     Swap(rhs);
     return *this;
   }
   ~openvariant() {
-    if (!m_value) return;
-    m_ops->m_destruct(m_value, 0, 1);
-    ::operator delete(m_value);
+    if (m_value) AnyValue::Destroy(*m_ops, m_value);
   }
 
   explicit operator bool() const { return m_value != nullptr; }
@@ -53,19 +64,15 @@ class openvariant {
 
   void Serialise(Archive& ar) const {
     if (m_value && !m_ops->m_serialise) throw ArchiveError("type of an openvariant cannot be archived");
-    ar << NameOf(m_ops);
+    ar << AnyValue::NameOf(m_ops);
     if (m_value) m_ops->m_serialise(ar, m_value, 0, 1);
   }
   void Deserialise(InputArchive& ar) {
-    xstring name;
-    ar >> name;
     openvariant read;
-    if (!name.empty()) {
-      if (!IsTypeAllowed(ar.m_objects.m_allow, ar.m_objects.m_allowType, name)) {
-        throw ArchiveError("type is not allowed: " + name);
-      }
-      read = DefaultOf(OpsOf(name));
-      read.m_ops->m_deserialise(ar, read.m_value, 0, 1);
+    if (TypeOps const* ops = AnyValue::ReadType(ar)) {
+      read.m_value = AnyValue::Default(*ops);
+      read.m_ops = ops;
+      ops->m_deserialise(ar, read.m_value, 0, 1);
     }
     Swap(read);
   }
@@ -77,58 +84,9 @@ class openvariant {
   }
 
  private:
-  typedef std::unique_ptr<void, void (*)(void*)> Memory;
-
   void Swap(openvariant& rhs) noexcept {
     std::swap(m_ops, rhs.m_ops);
     std::swap(m_value, rhs.m_value);
-  }
-  static Memory Allocate(TypeOps const& ops) {
-    return Memory(::operator new(ops.m_size), [](void* memory) { ::operator delete(memory); });
-  }
-  static openvariant DefaultOf(TypeOps const& ops) {
-    Memory memory = Allocate(ops);
-    ops.m_construct(memory.get(), 0, 1);
-    openvariant made;
-    made.m_ops = &ops;
-    made.m_value = memory.release();
-    return made;
-  }
-  static void* Clone(TypeOps const* ops, void const* value) {
-    if (!value) return nullptr;
-    if (!ops->m_copyConstruct || !ops->m_destruct) throw std::logic_error("type of an openvariant cannot be copied");
-    Memory memory = Allocate(*ops);
-    ops->m_copyConstruct(memory.get(), 0, value, 0, 1);
-    return memory.release();
-  }
-  static xstring NameOf(TypeOps const* ops) {
-    if (!ops) return xstring();
-    for (auto const& [name, registered] : TypeOpsTable()) {
-      if (registered == ops) return name;
-    }
-    for (ReflectedClass const* record : All<ReflectedClass>()) {
-      if (&record->m_ops == ops) return record->m_name;
-    }
-    for (ReflectedVariant const* record : All<ReflectedVariant>()) {
-      if (&record->m_ops == ops) return record->m_name;
-    }
-    throw ArchiveError(NotRegistered("type of an openvariant", ""));
-  }
-  static TypeOps const* FindOps(xstring const& name) {
-    const auto at = TypeOpsTable().find(name);
-    if (at != TypeOpsTable().end()) return at->second;
-    if (ReflectedClass const* record = Find<ReflectedClass>(name)) return &record->m_ops;
-    if (ReflectedVariant const* record = Find<ReflectedVariant>(name)) return &record->m_ops;
-    return nullptr;
-  }
-  // A name in an archive may be that of any registered type, also of one that no openvariant can hold.
-  static TypeOps const& OpsOf(xstring const& name) {
-    TypeOps const* ops = FindOps(name);
-    if (!ops) throw ArchiveError(NotRegistered("type of an openvariant", name));
-    if (!ops->m_construct || !ops->m_copyConstruct || !ops->m_destruct || !ops->m_deserialise) {
-      throw ArchiveError("type cannot be the value of an openvariant: " + name);
-    }
-    return *ops;
   }
 
   TypeOps const* m_ops = nullptr;

@@ -2,11 +2,28 @@
 // indices of arrays, the bytes of a key as an archive writes it. A path that is the beginning of another one holds it.
 
 @import "Vesk/vxObject/Registry.h"
+#include <algorithm>
+#include <cstring>
 
 namespace vesk {
 
 class Path {
  public:
+  Path() {}
+  Path(Path const& rhs) {
+    octet_t* const to = Resize(rhs.m_size);
+    if (m_size == 1) {  // a field, just written: no processor is quick to read more than that
+      *to = *rhs.Data();
+    } else {
+      std::memcpy(to, rhs.Data(), static_cast<std::size_t>(m_size));
+    }
+  }
+  Path& operator=(Path const& rhs) {
+    if (this != &rhs) std::memcpy(Resize(rhs.m_size), rhs.Data(), static_cast<std::size_t>(rhs.m_size));
+    return *this;
+  }
+  ~Path() { delete[] m_heap; }
+
   // A path of a known size: the caller fills the buffer.
   octet_t* InitLocalBuffer(ssize_t size) { return Resize(size); }
   octet_t* InitHeapBuffer(ssize_t size) { return Resize(size); }
@@ -16,7 +33,7 @@ class Path {
   void EndReserveLocal(octet_t* end) { m_size = end - Data(); }
   void EndReserveHeap(octet_t* end) { m_size = end - Data(); }
 
-  octet_t const* Data() const { return (m_heap.empty() ? m_local : m_heap.data()) + Ahead; }
+  octet_t const* Data() const { return (m_heap ? m_heap : m_local) + Ahead; }
   ssize_t Size() const { return m_size; }
   bool Holds(Path const& other) const {
     return m_size <= other.m_size && std::equal(Data(), Data() + m_size, other.Data());
@@ -33,15 +50,15 @@ class Path {
   // there as an integer.
   enum { Ahead = 7, LocalSize = 16 };
 
-  octet_t* Data() { return (m_heap.empty() ? m_local : m_heap.data()) + Ahead; }
+  octet_t* Data() { return (m_heap ? m_heap : m_local) + Ahead; }
   octet_t* Resize(ssize_t size) {
-    if (size > LocalSize) m_heap.resize(Ahead + size);
+    if (size > LocalSize) delete[] std::exchange(m_heap, new octet_t[static_cast<std::size_t>(Ahead + size)]);
     m_size = size;
     return Data();
   }
 
   alignas(8) octet_t m_local[Ahead + LocalSize];
-  xvector<octet_t> m_heap;
+  octet_t* m_heap = nullptr;  // of a longer path
   ssize_t m_size = 0;
 };
 

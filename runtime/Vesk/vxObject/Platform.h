@@ -4,7 +4,6 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstdlib>
-#include <iostream>
 #include <memory>
 #include <new>
 #include <type_traits>
@@ -57,10 +56,7 @@ typedef int64 RSN;
 struct NullInterface {};
 constexpr NullInterface null = {};
 
-[[noreturn]] inline void FailAssertion(ConstStringZ expression, ConstStringZ file, int line) {
-  std::cerr << file << "(" << line << ") : assertion failed : " << expression << std::endl;
-  std::abort();
-}
+[[noreturn]] void FailAssertion(ConstStringZ expression, ConstStringZ file, int line);
 
 }  // namespace vesk
 

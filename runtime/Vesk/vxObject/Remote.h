@@ -264,6 +264,8 @@ class Server {
   typedef std::function<void(std::string const&)> ErrorFunction;
   explicit Server(Channel& channel);
   ~Server();
+  Server(Server const&) = delete;
+  void operator=(Server const&) = delete;
 
   // The object must live until it is taken back. RemoteError for null and for an interface that is not registered.
   template <typename I>
@@ -290,14 +292,12 @@ class Server {
   EServed ServeNext();
 
  private:
-  struct Exported {
-    std::shared_ptr<Dispatcher> m_dispatcher;  // an object may be taken back by its own method
-    void* m_self = nullptr;                    // as its thunks see it
-  };
+  struct Exported;
+  struct Objects;
 
   uint32 ExportSkeleton(ConstStringZ name, AnyInterface object);
   uint32 ExportScion(ConstStringZ name, AnyInterface object);
-  uint32 Add(Exported exported, AnyInterface object);
+  uint32 Add(Exported const& exported, AnyInterface object);
 
   struct Call {
     uint32 m_answer = 0;
@@ -314,7 +314,7 @@ class Server {
   std::size_t m_messageLimit = kMessageLimit;
   ErrorFunction m_onError;
   uint32 m_lastNumber = 0;
-  std::map<uint32, Exported> m_objects;
+  Objects* m_objects;
 };
 
 std::unique_ptr<Stub> ImportStub(ClientConnection& connection, uint32 object, ConstStringZ name);

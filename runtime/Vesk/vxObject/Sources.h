@@ -35,10 +35,17 @@ class PathSource {
   static void OnRead(void const* object, Path const& path) {
     if (IsInputWanted()) Read(object, path);
   }
-  static void OnWrite(void const* object, Path const& path);
+  static void OnWrite(void const* object, Path const& path) {
+    if (object != s_unread) Write(object, path);
+  }
 
  private:
+  friend class PathNode;
   static void Read(void const* object, Path const& path);
+  static void Write(void const* object, Path const& path);
+
+  // The object that was written last, if no calculation has read it: it is often the next one, too.
+  static inline thread_local void const* s_unread = nullptr;
 };
 
 }  // namespace vesk

@@ -5,9 +5,9 @@
 
 #include <algorithm>
 #include <atomic>
-#include <charconv>
 #include <cstring>
-#include <iostream>
+#include <iosfwd>
+#include <stdexcept>
 #include <string>
 #include <string_view>
 
@@ -18,9 +18,17 @@ class basic_xstring : public std::basic_string<C> {
  public:
   typedef std::basic_string<C> base;
   using base::base;
+  using base::insert;
+  using typename base::const_iterator;
+  using typename base::iterator;
   basic_xstring() {}
   basic_xstring(base const& text) : base(text) {}
   basic_xstring(base&& text) : base(std::move(text)) {}
+  // A hook may have taken the position away since it was asked for: std::out_of_range.
+  iterator insert(const_iterator at, C const* first, C const* last) {
+    if (at - base::cbegin() > base::cend() - base::cbegin()) throw std::out_of_range("position to insert at");
+    return base::insert(at, first, last);
+  }
 };
 typedef basic_xstring<char8> string8;
 typedef basic_xstring<char16> string16;
@@ -39,7 +47,10 @@ class xostream {
  public:
   explicit xostream(std::ostream& target) : m_target(&target) {}
   xostream() : m_target(nullptr) {}
-  ~xostream() { std::free(m_text); }
+  ~xostream() {
+    if (m_stream) DropStream();
+    std::free(m_text);
+  }
   xostream(xostream const&) = delete;
   void operator=(xostream const&) = delete;
 
@@ -55,122 +66,43 @@ class xostream {
   }
 
   // In the shortest form that reads back as the same number, whatever the locale.
-  template <typename T>
-  void WriteNumber(T value) {
-    if (m_end - m_at >= MostDigits) {
-      m_at = std::to_chars(m_at, m_at + MostDigits, value).ptr;
-      return;
-    }
-    char text[MostDigits];
-    WriteLines(std::string_view(text, std::to_chars(text, text + MostDigits, value).ptr - text));
-  }
+  void WriteNumber(int value);
+  void WriteNumber(unsigned value);
+  void WriteNumber(long value);
+  void WriteNumber(unsigned long value);
+  void WriteNumber(long long value);
+  void WriteNumber(unsigned long long value);
+  void WriteNumber(float value);
+  void WriteNumber(double value);
+  void WriteNumber(long double value);
+  void WriteAddress(void const* address);
 
-  void ChangeIndent(int by) {
-    TakeRoom();
-    if (m_target) {
-      m_indent.fetch_add(by, std::memory_order_relaxed);
-    } else {
-      m_indent.store(Indent() + by, std::memory_order_relaxed);
-    }
-    OfferRoom();
-  }
-
+  void ChangeIndent(int by);
   // For what only a std::ostream prints; no indentation there.
-  std::ostream& Target() {
-    if (!m_target && !m_stream) m_stream = std::make_unique<MemoryStream>(*this);
-    return m_target ? *m_target : *m_stream;
-  }
-
+  std::ostream& Target();
   // What was written into memory; it begins anew.
-  xstring TakeText() {
-    TakeRoom();
-    return std::string(m_text ? m_text : "", std::exchange(m_size, 0));
-  }
+  xstring TakeText();
 
  private:
-  struct MemoryStream : private std::streambuf, public std::ostream {
-    typedef std::char_traits<char> traits_type;
-    explicit MemoryStream(xostream& text) : std::ostream(this), m_text(text) {}
-    std::streamsize xsputn(char const* text, std::streamsize size) override {
-      m_text.TakeRoom();
-      m_text.Append(std::string_view(text, static_cast<std::size_t>(size)));
-      m_text.OfferRoom();
-      return size;
-    }
-    int overflow(int c) override {
-      const char character = static_cast<char>(c);
-      if (c != traits_type::eof()) xsputn(&character, 1);
-      return 0;
-    }
-    xostream& m_text;
-  };
-
+  struct MemoryStream;
   enum { MostDigits = 64 };
 
-  // The room is m_text behind m_size, as long as it is offered.
-  void OfferRoom() {
-    if (m_target || Indent() != 0 || !m_text) return;
-    m_at = m_text + m_size;
-    m_end = m_text + m_capacity;
-  }
-  void TakeRoom() {
-    if (!m_end) return;
-    const std::size_t size = static_cast<std::size_t>(m_at - m_text);
-    if (size != m_size) SetAtLineStart(m_text[size - 1] == '\n');
-    m_size = size;
-    m_at = m_end = nullptr;
-  }
-
+  void OfferRoom();
+  void TakeRoom();
   int Indent() const { return m_indent.load(std::memory_order_relaxed); }
   void SetAtLineStart(bool is) { m_atLineStart.store(is, std::memory_order_relaxed); }
-
-  // Some text.
-  void WriteLines(std::string_view text) {
-    TakeRoom();
-    const int indent = Indent();
-    if (indent == 0) {
-      Append(text);
-    } else {
-      Append(IndentedText(text, indent > 0 ? static_cast<std::size_t>(indent) : 0));
-    }
-    SetAtLineStart(text.back() == '\n');
-    OfferRoom();
-  }
-  // Empty lines stay empty.
-  std::string IndentedText(std::string_view text, std::size_t indent) const {
-    std::string lines;
-    bool atLineStart = m_atLineStart.load(std::memory_order_relaxed);
-    for (const char c : text) {
-      if (atLineStart && c != '\n') lines.append(indent, ' ');
-      lines += c;
-      atLineStart = c == '\n';
-    }
-    return lines;
-  }
-  void Append(std::string_view text) {
-    if (m_target) {
-      m_target->write(text.data(), static_cast<std::streamsize>(text.size()));
-      return;
-    }
-    if (text.empty()) return;
-    if (m_capacity - m_size < text.size() + MostDigits) Grow(text.size() + MostDigits);
-    std::memcpy(m_text + m_size, text.data(), text.size());
-    m_size += text.size();
-  }
-
-  // Large blocks are moved by their pages.
-  void Grow(std::size_t by) {
-    const std::size_t capacity = std::max(2 * m_capacity, m_size + by);
-    void* text = std::realloc(m_text, capacity);
-    if (!text) throw std::bad_alloc();
-    m_text = static_cast<char*>(text);
-    m_capacity = capacity;
-  }
+  void WriteLines(std::string_view text);
+  std::string IndentedText(std::string_view text, std::size_t indent) const;
+  void Append(std::string_view text);
+  void Grow(std::size_t by);
+  void DropStream();
+  template <typename T>
+  void WriteShortest(T value);
 
   char* m_at = nullptr;
   char* m_end = nullptr;
   std::ostream* m_target;
-  std::unique_ptr<MemoryStream> m_stream;
+  MemoryStream* m_stream = nullptr;
   char* m_text = nullptr;
   std::size_t m_size = 0;
   std::size_t m_capacity = 0;
@@ -197,37 +129,16 @@ class ScopeWriter2 {
 };
 
 // The standard output.
-inline xostream& xout() {
-  static xostream* const os = new xostream(std::cout);  // outlives every static object
-  return *os;
-}
+xostream& xout();
 
-inline void AppendUtf8(std::string& text, uint32 c) {
-  if (c < 0x80) {
-    text += static_cast<char>(c);
-    return;
-  }
-  const int more = c < 0x800 ? 1 : c < 0x10000 ? 2 : 3;
-  text += static_cast<char>((0xF00 >> (more + 1) & 0xFF) | c >> 6 * more);
-  for (int i = more - 1; i >= 0; --i) text += static_cast<char>(0x80 | (c >> 6 * i & 0x3F));
-}
+void AppendUtf8(std::string& text, uint32 c);
+std::string Utf8Text(std::u16string_view units);
+std::string DecimalText(uint128 value);
 
-inline std::string Utf8Text(std::u16string_view units) {
-  std::string text;
-  for (std::size_t i = 0; i < units.size(); ++i) {
-    uint32 c = units[i];
-    const bool isPair = (c & 0xFC00) == 0xD800 && i + 1 < units.size() && (units[i + 1] & 0xFC00) == 0xDC00;
-    if (isPair) c = 0x10000 + ((c & 0x3FF) << 10) + (units[++i] & 0x3FF);
-    AppendUtf8(text, c);
-  }
-  return text;
-}
-
-inline std::string DecimalText(uint128 value) {
-  std::string digits;
-  do digits.insert(digits.begin(), static_cast<char>('0' + static_cast<int>(value % 10)));
-  while (value /= 10);
-  return digits;
+// Functions have one, too.
+template <typename T>
+void const* AddressOf(T* pointer) {
+  return reinterpret_cast<void const*>(reinterpret_cast<std::uintptr_t>(pointer));
 }
 
 template <typename T>
@@ -275,10 +186,7 @@ inline xostream& operator<<(xostream& os, string16 const& text) {
 
 template <typename T>
 xostream& operator<<(xostream& os, T* address) {
-  char text[2 + 2 * sizeof(address)] = {'0', 'x'};
-  const std::uintptr_t number = reinterpret_cast<std::uintptr_t>(address);
-  char* end = number ? std::to_chars(text + 2, text + sizeof(text), number, 16).ptr : text + 1;
-  os.Write(std::string_view(text, end - text));
+  os.WriteAddress(AddressOf(address));
   return os;
 }
 

@@ -4,6 +4,8 @@
 @import "Vesk/vxObject/Archive.h"
 @import "Vesk/vxObject/Visitors.h"
 
+#include <cstring>
+
 namespace vesk {
 
 template <typename T>
@@ -34,7 +36,11 @@ void PrintVariable(xostream& os, T const* x) {
 
 template <typename T>
 void ConstructArray(T* array, ssize_t begin, ssize_t end) {
-  std::uninitialized_value_construct(array + begin, array + end);
+  if constexpr (IsArithmetic<T>) {
+    std::memset(array + begin, 0, static_cast<std::size_t>(end - begin) * sizeof(T));
+  } else {
+    std::uninitialized_value_construct(array + begin, array + end);
+  }
 }
 
 // A container of keys that have no order is always empty, and not every standard library can copy it.
@@ -45,7 +51,9 @@ constexpr bool IsEverEmpty<T, std::enable_if_t<ContainerTraits<T>::keyed>> = !Ha
 
 template <typename T>
 void CopyConstructArray(T* array, ssize_t at, T const* source, ssize_t begin, ssize_t end) {
-  if constexpr (IsEverEmpty<T>) {
+  if constexpr (IsArithmetic<T>) {
+    std::memcpy(array + at, source + begin, static_cast<std::size_t>(end - begin) * sizeof(T));
+  } else if constexpr (IsEverEmpty<T>) {
     ConstructArray(array, at, at + end - begin);
   } else {
     std::uninitialized_copy(source + begin, source + end, array + at);
@@ -111,24 +119,34 @@ inline std::size_t AlignmentOf(TypeOps const& ops) {
 
 template <typename T>
 void VisitObjectsInArray(IObjectVisitor& v, T const* array, ssize_t begin, ssize_t end) {
-  for (ssize_t i = begin; i < end; ++i) v << array[i];
+  if constexpr (!IsArithmetic<T>) {
+    for (ssize_t i = begin; i < end; ++i) v << array[i];
+  }
 }
 
 template <typename T>
 void VisitPrefsInArray(IPrefVisitor& v, T const* array, ssize_t begin, ssize_t end) {
-  for (ssize_t i = begin; i < end; ++i) v << array[i];
+  if constexpr (!IsArithmetic<T>) {
+    for (ssize_t i = begin; i < end; ++i) v << array[i];
+  }
 }
 
 template <typename T>
 ssize_t BinaryLowerBound(T const* array, ssize_t begin, ssize_t end, T const* key) {
-  auto less = [](T const& a, T const& b) { return VariableLess(&a, &b); };
-  return std::lower_bound(array + begin, array + end, *key, less) - array;
+  while (begin < end) {
+    const ssize_t middle = begin + (end - begin) / 2;
+    VariableLess(array + middle, key) ? begin = middle + 1 : end = middle;
+  }
+  return begin;
 }
 
 template <typename T>
 ssize_t BinaryUpperBound(T const* array, ssize_t begin, ssize_t end, T const* key) {
-  auto less = [](T const& a, T const& b) { return VariableLess(&a, &b); };
-  return std::upper_bound(array + begin, array + end, *key, less) - array;
+  while (begin < end) {
+    const ssize_t middle = begin + (end - begin) / 2;
+    VariableLess(key, array + middle) ? end = middle : begin = middle + 1;
+  }
+  return begin;
 }
 
 template <typename T>

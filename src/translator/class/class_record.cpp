@@ -343,6 +343,7 @@ void ClassDef::WriteReflection(TextWriter& out, RegistrationLists& lists) {
       WriteDeserialise(out, *this, Placement::OutOfClass);
     }
     WriteDataSourceRsnFunctions(out, *this, Placement::OutOfClass);
+    if (!IsMixin()) WriteModelStreamInsertionInTail(out, *this);
   }
   out << m_deferredText;
   WriteRegistration(out, *this, lists);

@@ -54,6 +54,8 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   // All of its text is where the class is, as templates of C++ and members of classes need it: its functions are
   // templates or friends, and its reflection tail is empty.
   bool IsWholeInPlace() const { return WantsCompilableText() && MemberPlacement() == Placement::InClass; }
+  // What need not be in the class is in a tail.
+  bool HasTail() const { return HaveSomethingToRegister() && MemberPlacement() == Placement::OutOfClass; }
   bool ExternalDefinition() const { return m_qualifiers.extern_ == TriState::On; }
   bool WriteTraits() const { return m_qualifiers.traits != TriState::Off && !m_nested && !IsTemplate(); }
   std::string_view StructWord() const { return IsUnderlyingStruct() ? "struct " : "class "; }

@@ -56,6 +56,7 @@ bool CopySource(const ScannedFile& file, const std::string& target) {
 void SetTranslated(ScannedFile& file, int64_t time) {
   file.times.translation = time;
   file.times.latestTarget = file.times.target = 0;
+  file.times.targetPrint = 0;
 }
 
 }  // namespace

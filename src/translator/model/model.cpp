@@ -439,8 +439,23 @@ void WriteInsertionList(TextWriter& out, const ClassDef& def, std::string_view p
         "name"_ = def.name, "fields"_ = Each(out, fields, " << ','", writeField));
 }
 
+void WriteInsertionFunction(TextWriter& out, const ClassDef& def, std::string_view prefix, std::string_view name) {
+  const auto writeFields = def.m_qualifiers.multiline == TriState::On ? WriteInsertionLines : WriteInsertionList;
+  Write(out, R"(
+    $prefix$vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x)
+    {
+        $fields$
+        return _os;
+    }
+  )",
+        "prefix"_ = prefix, "name"_ = name,
+        "fields"_([&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); }));
+}
+
 }  // namespace
 
+// The function looks at those of all types of its name space, once for each `<<`: text that compiles has it in the
+// tail, so that not every file which sees the class pays for that.
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
   const bool compilable = def.WantsCompilableText();
   const std::string prefix = compilable ? def.FunctionPrefix() : "";
@@ -454,16 +469,17 @@ void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def) {
     return;
   }
   if (!def.IsPureModel() && !def.m_inheritsModel) return;
-  const auto writeFields = def.m_qualifiers.multiline == TriState::On ? WriteInsertionLines : WriteInsertionList;
-  Write(out, R"(
-    $prefix$inline vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x)
-    {
-        $fields$
-        return _os;
-    }
-  )",
-        "prefix"_ = prefix, "name"_ = name,
-        "fields"_([&] { writeFields(out, def, def.IsPureModel() ? "" : "_model_."); }));
+  if (compilable && def.HasTail()) {
+    Write(out, "$api$vesk::xostream& operator<<(vesk::xostream& _os,$name$ const& _x);\n", "api"_ = ExportPrefix(def),
+          "name"_ = name);
+    return;
+  }
+  WriteInsertionFunction(out, def, prefix + "inline ", name);
+}
+
+void WriteModelStreamInsertionInTail(TextWriter& out, const ClassDef& def) {
+  if (!def.WantsCompilableText() || def.m_referencedModel || def.m_qualifiers.os != TriState::Unset) return;
+  if (def.IsPureModel() || def.m_inheritsModel) WriteInsertionFunction(out, def, ExportPrefix(def), def.name);
 }
 
 }  // namespace qrex

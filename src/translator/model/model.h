@@ -32,6 +32,7 @@ void WriteTargetDeclarations(TextWriter& out, const ClassDef& def);
 void WriteDataSourceRsnFunctions(TextWriter& out, const ClassDef& def, Placement placement);
 
 void WriteModelStreamInsertion(TextWriter& out, const ClassDef& def);  // when `os` is unset
+void WriteModelStreamInsertionInTail(TextWriter& out, const ClassDef& def);
 // Behind metadata, decorators and fixed arrays, is there a map or a set? That type, or none.
 TypeView MapOrSetIn(TypeView type);
 inline bool HoldsMapOrSet(TypeView type) { return !MapOrSetIn(type).Empty(); }

@@ -99,6 +99,10 @@ struct KnownTimes {
   int64_t latestSource = 0;  // the latest of these over the import closure
   int64_t latestTarget = 0;
   int64_t translation = 0;  // when the output was last brought up to date
+  uint64_t sourceSize = 0;  // with `source`, where fingerprints ask for it; so with the target
+  uint64_t targetSize = 0;
+  uint64_t sourcePrint = 0;  // of times and sizes over the import closure, see builder/staleness.h
+  uint64_t targetPrint = 0;
 };
 
 class ScannedFile {

@@ -1,7 +1,7 @@
 // Numbers, bools, characters and labels in JSON. Each is read at the next token, checked, and then set; what does not
 // fit fails there. The Set functions take the text of a token or of a key that stood `at` a position.
 
-@import "json_scanner.h"
+@import "Vesk/vxObject/src/json_scanner.h"
 
 namespace vesk {
 

@@ -1,24 +1,42 @@
 // Remote calls: what carries messages within a thread, and how either side makes and reads them.
 
 @import "Vesk/vxObject/IObject.h"
-@import "shared.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <algorithm>
+#include <deque>
+#include <map>
 
 namespace vesk {
 
 // --- The channel of a thread
 
-LocalChannel::LocalChannel() : m_ends{End(m_queues[0], m_queues[1]), End(m_queues[1], m_queues[0])} {}
-LocalChannel::~LocalChannel() {}
+struct LocalChannel::Ends {
+  typedef std::deque<xvector<octet_t>> Queue;
+  struct End : Channel {
+    End(Queue& out, Queue& in) : m_out(out), m_in(in) {}
+    void Send(xvector<octet_t> const& message) override { m_out.push_back(message); }
+    bool Receive(xvector<octet_t>& message) override {
+      if (m_in.empty()) return false;
+      message = std::move(m_in.front());
+      m_in.pop_front();
+      return true;
+    }
+    Queue& m_out;
+    Queue& m_in;
+  };
+  Queue m_out, m_back;
+  End m_client{m_out, m_back}, m_server{m_back, m_out};
+};
 
-void LocalChannel::End::Send(xvector<octet_t> const& message) { m_out.push_back(message); }
+LocalChannel::LocalChannel() : m_ends(new Ends) {}
+LocalChannel::~LocalChannel() { delete m_ends; }
+Channel& LocalChannel::Client() { return m_ends->m_client; }
+Channel& LocalChannel::Server() { return m_ends->m_server; }
 
-bool LocalChannel::End::Receive(xvector<octet_t>& message) {
-  if (m_in.empty()) return false;
-  message = std::move(m_in.front());
-  m_in.pop_front();
-  return true;
+std::chrono::steady_clock::time_point EndOf(std::chrono::milliseconds time) {
+  typedef std::chrono::milliseconds Time;
+  return std::chrono::steady_clock::now() + std::clamp<Time>(time, Time(0), std::chrono::hours(24 * 365 * 100));
 }
 
 xstring TooLongText(std::size_t size, std::size_t limit) {
@@ -194,32 +212,41 @@ void Dispatcher::CheckArgumentsRead() const {
   if (m_arguments.Remaining() > 0) throw RemoteError("bytes behind the arguments");
 }
 
+// Of one kind; all have the same map, as the compiler takes a while over each.
 template <typename Factory>
-std::map<std::string, Factory*>& FactoryTable() {
-  return Shared<std::map<std::string, Factory*>>();
-}
+struct Factories {
+  std::map<std::string, void*> m_byName;
+  static std::map<std::string, void*>& Get() { return Shared<Factories<Factory>>().m_byName; }
+};
 
-void RegisterStub(ConstStringZ name, IStubFactory* factory) { FactoryTable<IStubFactory>()[name] = factory; }
-void UnregisterStub(ConstStringZ name) { FactoryTable<IStubFactory>().erase(name); }
+void RegisterStub(ConstStringZ name, IStubFactory* factory) { Factories<IStubFactory>::Get()[name] = factory; }
+void UnregisterStub(ConstStringZ name) { Factories<IStubFactory>::Get().erase(name); }
 void RegisterSkeleton(ConstStringZ name, ISkeletonFactory* factory) {
-  FactoryTable<ISkeletonFactory>()[name] = factory;
+  Factories<ISkeletonFactory>::Get()[name] = factory;
 }
-void UnregisterSkeleton(ConstStringZ name) { FactoryTable<ISkeletonFactory>().erase(name); }
-void RegisterScion(ConstStringZ name, IScionFactory* factory) { FactoryTable<IScionFactory>()[name] = factory; }
-void UnregisterScion(ConstStringZ name) { FactoryTable<IScionFactory>().erase(name); }
+void UnregisterSkeleton(ConstStringZ name) { Factories<ISkeletonFactory>::Get().erase(name); }
+void RegisterScion(ConstStringZ name, IScionFactory* factory) { Factories<IScionFactory>::Get()[name] = factory; }
+void UnregisterScion(ConstStringZ name) { Factories<IScionFactory>::Get().erase(name); }
 
 template <typename Factory>
 Factory& FactoryOf(ConstStringZ name) {
-  const auto at = FactoryTable<Factory>().find(name);
-  if (at == FactoryTable<Factory>().end()) throw RemoteError("no remote interface of this name: " + std::string(name));
-  return *at->second;
+  auto const& factories = Factories<Factory>::Get();
+  const auto at = factories.find(name);
+  if (at == factories.end()) throw RemoteError("no remote interface of this name: " + std::string(name));
+  return *static_cast<Factory*>(at->second);
 }
 template IStubFactory& FactoryOf<IStubFactory>(ConstStringZ);
 template ISkeletonFactory& FactoryOf<ISkeletonFactory>(ConstStringZ);
 template IScionFactory& FactoryOf<IScionFactory>(ConstStringZ);
 
-Server::Server(Channel& channel) : m_channel(channel) {}
-Server::~Server() {}
+struct Server::Exported {
+  std::shared_ptr<Dispatcher> m_dispatcher;  // an object may be taken back by its own method
+  void* m_self = nullptr;                    // as its thunks see it
+};
+struct Server::Objects : std::map<uint32, Exported> {};
+
+Server::Server(Channel& channel) : m_channel(channel), m_objects(new Objects) {}
+Server::~Server() { delete m_objects; }
 
 uint32 Server::ExportSkeleton(ConstStringZ name, AnyInterface object) {
   if (!name) throw RemoteError("null cannot be exported");
@@ -231,12 +258,12 @@ uint32 Server::ExportScion(ConstStringZ name, AnyInterface object) {
   Scion* scion = FactoryOf<IScionFactory>(name).CreateScion();
   return Add({std::shared_ptr<Dispatcher>(scion), scion}, object);
 }
-uint32 Server::Add(Exported exported, AnyInterface object) {
+uint32 Server::Add(Exported const& exported, AnyInterface object) {
   exported.m_dispatcher->SetDelegate(object);
-  m_objects[++m_lastNumber] = std::move(exported);
+  (*m_objects)[++m_lastNumber] = exported;
   return m_lastNumber;
 }
-bool Server::Unexport(uint32 number) { return m_objects.erase(number) > 0; }
+bool Server::Unexport(uint32 number) { return m_objects->erase(number) > 0; }
 
 void Server::OnError(ErrorFunction function) { m_onError = std::move(function); }
 
@@ -293,8 +320,8 @@ Archive Server::Carry(xvector<octet_t> message, Call& call) {
   DeserialiseVariableLengthUint(ar, answer);
   call.m_answer = answer;
   CheckMessageSize(size, m_messageLimit);
-  const auto at = m_objects.find(object);
-  if (at == m_objects.end()) throw RemoteError("no such remote object");
+  const auto at = m_objects->find(object);
+  if (at == m_objects->end()) throw RemoteError("no such remote object");
   const Exported exported = at->second;
   exported.m_dispatcher->CheckMethod(method);
   call.m_isCall = true;

@@ -122,3 +122,12 @@ ROW(Fields) {
     CHECK(dirty([&] { operated.size.width = 2; }), "00001");
     CHECK(dirty([&] { operated.EvictDgsNodes(); }), "00001");
 }
+
+ROW(WordsOfTheGraph) {
+    words::Nodes nodes;
+    nodes.link = {1};
+    nodes.leave = {2};
+    CHECK(nodes.calculation().n + nodes.run(3).n + nodes.state().n + nodes.queue(4).n, 6);
+    vesk::RunAsyncCalculations();
+    CHECK(nodes.state().n + nodes.queue(4).n, 12);
+}

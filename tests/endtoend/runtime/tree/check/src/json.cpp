@@ -162,6 +162,35 @@ ROW(JsonBothWays) {
     CHECK(back == values, true);
 }
 
+// At the ends of blocks and across them; 512 bytes in one library.
+template <typename T, typename Make>
+void CheckDeque(Make make) {
+    const int inBlock = int(512 / sizeof(T));
+    for (int size : {0, 1, inBlock - 1, inBlock, 9 * inBlock + 1}) {
+        vesk::xdeque<T> items, back;
+        for (int i = 0; i < size; ++i) items.push_back(make(i));
+        for (int i = 0; i < size && i < 3; ++i) {  // so that it does not begin where a block does
+            items.push_front(items.back());
+            items.pop_back();
+        }
+        for (int round = 0; round < 2; ++round) CHECK(ErrorOf(back, Json(items)), "none");
+        CHECK(back == items, true);
+        back.push_back(make(1));
+        back.push_front(make(2));
+        CHECK(back.front() == make(2) && back.back() == make(1) && back.size() == items.size() + 2, true);
+    }
+    vesk::xdeque<T> broken;
+    CHECK(ErrorOf(broken, "[null]") != "none" && broken.size() <= 1, true);
+}
+
+ROW(JsonDeques) {
+    CheckDeque<int8>([](int i) { return int8(i); });
+    CheckDeque<int16>([](int i) { return int16(i); });
+    CheckDeque<vesk::float64>([](int i) { return i * 0.5; });
+    CheckDeque<vesk::string8>([](int i) { return vesk::string8(i % 50, 'x'); });
+    CheckDeque<Part>([](int i) { return MakePart(i, "a much longer name than fits"); });
+}
+
 ROW(JsonErrors) {
     typedef vesk::xvector<int32> Ints;
     for (auto [text, error] : std::initializer_list<std::pair<const char*, const char*>>{

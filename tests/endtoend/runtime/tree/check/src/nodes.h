@@ -115,6 +115,28 @@ $struct Watcher {
     mutable int32 calculated = 0;
 };
 
+// Types of a user whose names are also words of the graph.
+namespace words {
+$struct Link {
+    int32 n = 0;
+    bool operator==(Link const& rhs) const { return n == rhs.n; }
+    bool operator!=(Link const& rhs) const { return n != rhs.n; }
+};
+typedef Link Calculation, Run, Mark, Drop, Leave, Links, Changes, Place, State, Queue, Source, Of, At;
+$struct Nodes {
+    $indep Link link;
+    $indep Leave leave;
+    $indep Of of;
+    $dep Mark mark = { mark.n = link.read().n + leave.read().n; };
+    $dep Changes changes = { changes = mark; };
+    $dep Drop drop = { drop = changes; };
+    $cache Calculation calculation() const { return drop; }
+    $cache Run run(int32 n) const { return Run{n + of.read().n}; }
+    $cache <<async>> State state() const { return State{7}; }
+    $cache <<async>> Queue queue(int32 n) const with Source in = { in = link; }; { return Queue{n + in.n}; }
+};
+}
+
 // Objects that refer to each other; how many there are.
 $class+ Linked isa kinds::IDoc : model { pref<kinds::IDoc> next; int32 number; cref<kinds::Size> size; }
 {

@@ -66,6 +66,31 @@ ROW(LinkedObjects) {
     CHECK(Linked::s_count, 0);
 }
 
+// A later program wrote of a class that is not here, and of one that has lost what it refers to.
+ROW(LaterPrograms) {
+    Linked both[2];
+    kinds::Size size;
+    both[0].next = &both[1];
+    both[1].size = &size;
+    size.width = 77;
+    size.colour = shapes::Green;
+    const vesk::xvector<vesk::octet_t> bytes = vesk::WriteObject(vesk::ptr<kinds::IDoc>(&both[0]));
+    auto error = [&bytes](std::string const& what, vesk::octet_t instead) {
+        vesk::xvector<vesk::octet_t> later = bytes;
+        const auto at = std::search(later.begin(), later.end(), what.begin(), what.end());
+        at[ssize_t(what.size()) - 1] = instead;
+        try {
+            vesk::ReadObject<kinds::IDoc>(later);
+        } catch (vesk::ArchiveError const& refused) {
+            return vesk::xstring(refused.what());
+        }
+        return vesk::xstring("none");
+    };
+    CHECK(error("Linked", 'x'), "class is not registered: Linkex");
+    CHECK(error(std::string("M\0\0\0\0\0\0\0\x05", 9), 4), "number without a label in an enumeration");
+    CHECK(Linked::s_count, 2);
+}
+
 ROW(ReadClasses) {
     Unlike unlike;
     Linked linked;

@@ -74,6 +74,33 @@ void CheckOwnFields() {
     CHECK(own.map.read()["b"], Word(1));
 }
 
+// A hook takes away what a write is about to use.
+template <typename M>
+void CheckErasingHooks() {
+    M own;
+    auto refused = [&own](auto write) {
+        own.words.model() = {Word(1), Word(2)};
+        own.text.model() = Word(3);
+        vesk::ModelHook hook([&own](vesk::ModelChange const&) {
+            own.words.model().clear();
+            own.text.model().clear();
+        });
+        try {
+            write();
+        } catch (std::out_of_range const&) {
+            return own.words.model().empty() && own.text.model().empty();
+        }
+        return false;
+    };
+    const vesk::string8 text = "inserted";
+    CHECK(refused([&] { own.text.push_back('x'); }), true);
+    CHECK(refused([&] { own.text.insert(5, text.data(), 8); }), true);
+    CHECK(refused([&] { own.text.erase(5); }), true);
+    CHECK(refused([&] { own.words.push_back(text); }), true);
+    CHECK(refused([&] { own.words.insert(1, &text, 1); }), true);
+    CHECK(refused([&] { own.words.pop_back(); }), true);
+}
+
 Tree Leaf(int n) { return Tree(int32(n)); }
 Tree Node(vesk::xvector<Tree> branches) { return Tree(Tree::node(branches)); }
 
@@ -108,6 +135,8 @@ struct Counted {
 ROW(OwnParts) {
     CheckOwnFields<Owns>();
     CheckOwnFields<OwnsPlain>();
+    CheckErasingHooks<Owns>();
+    CheckErasingHooks<OwnsPlain>();
     Owns own;
     own.all = vesk::xvector<vesk::string8>{Word(1), Word(2)};
     own.all = own.all.read();

@@ -4,6 +4,7 @@
 @import "Vesk/vxObject/IObject.h"
 @import "Vesk/vxObject/SocketChannel.h"
 
+#include <malloc.h>
 #include <sys/resource.h>
 #include <ctime>
 #include <thread>
@@ -37,6 +38,22 @@ public:
     int32 told = 0;
     std::function<void()> nest;
 };
+
+// What the program holds, and which of this thread's allocations fails.
+std::atomic<std::size_t> g_held;
+thread_local int t_untilFailure = 0;
+
+void* operator new(std::size_t size) {
+    void* const memory = t_untilFailure > 0 && --t_untilFailure == 0 ? nullptr : std::malloc(size);
+    if (!memory) throw std::bad_alloc();
+    g_held += malloc_usable_size(memory);
+    return memory;
+}
+void operator delete(void* memory) noexcept {
+    g_held -= malloc_usable_size(memory);
+    std::free(memory);
+}
+void operator delete(void* memory, std::size_t) noexcept { operator delete(memory); }
 
 typedef std::chrono::steady_clock Clock;
 typedef std::chrono::milliseconds Time;
@@ -166,16 +183,26 @@ void CheckLeaving() {
     CHECK(host.sum.told == 300 && host.errors > 0 && host.errors < 1000 && host.server.Clients() == 0);
 }
 
-// The end is kept, and others are served, while one client sends more than can be carried out.
+// The end is kept, others are served and memory is bounded while one client sends more than can be carried out.
 void CheckFlood() {
     Host host;
+    host.server.SetMessageLimit(100000);
     Raw flood(host);
-    std::thread sending([&flood] { flood.Send(kTell, 100000); });
+    const std::size_t before = g_held;
+    std::size_t most = 0;
+    std::thread sending([&flood] {
+        for (int i = 0; i < 1000; ++i) flood.Send(kTell, 1000);  // 11 MB
+    });
     Raw other(host);
     other.Send(kSay);
     host.Serve(Time(5000), [&] { return host.sum.told > 0 && other.socket.available() > 0; });
     CHECK(host.sum.told < 1000);
-    CHECK(host.Serve(Time(300)) < Time(2000));
+    auto measure = [&] {
+        most = std::max<std::size_t>(most, g_held);
+        return false;
+    };
+    CHECK(host.Serve(Time(600), measure) < Time(2000));
+    CHECK(most - before > 100000 && most - before < 400000);
     CHECK(host.server.Clients() == 2);
     flood.socket.shutdown(Tcp::socket::shutdown_both);
     sending.join();
@@ -199,6 +226,34 @@ void CheckDescriptors() {
     setrlimit(RLIMIT_NOFILE, &limit);
     host.Serve(Time(5000), [&] { return host.server.Clients() == 3; });
     CHECK(host.server.Clients() == 3);
+}
+
+// Where memory runs out, at whatever place, a client may be lost; the server serves the next one.
+void CheckMemory() {
+    Host host;
+    bool hasFailed = true;
+    int runs = 0;
+    for (; hasFailed; ++runs) {
+        {
+            Raw raw(host);
+            raw.Send(kSay);
+            bool isServing = false, isServed = false;
+            host.Serve(Time(50), [&] {
+                if (!std::exchange(isServing, true)) t_untilFailure = runs + 1;
+                return isServed = raw.socket.available() > 0;
+            });
+            hasFailed = t_untilFailure <= 0;
+            t_untilFailure = 0;
+            CHECK(hasFailed || isServed);
+        }
+        Raw next(host);
+        next.Send(kSay);
+        host.Serve(Time(5000), [&] { return next.socket.available() > 0; });
+        CHECK(next.socket.available() == 9);
+    }
+    CHECK(runs > 5);
+    host.Serve(Time(5000), [&] { return host.server.Clients() == 0; });
+    CHECK(host.server.Clients() == 0);
 }
 
 // Methods that serve while they are called by a client that leaves, and that call their own server.
@@ -247,6 +302,7 @@ int main() {
     CheckLeaving();
     CheckFlood();
     CheckDescriptors();
+    CheckMemory();
     CheckNesting();
     vesk::xout() << sum.sum << '\n';
 }

@@ -1,6 +1,6 @@
 // Going on on another stack, and back. Sanitizers are told of it.
 
-@import "Vesk/vxObject/Graph.h"
+@import "Vesk/vxObject/src/parts/graph_rest.h"
 
 #include <algorithm>
 #include <exception>
@@ -145,12 +145,12 @@ void CalculationStack::RunOn(void (*action)(void*), void* of) {
 #endif
 
 // On the next stack; where all are used up, or there is none, further out.
-void DGNode::CalculateElsewhere(GraphState& state) const {
-  CalculationStack* const end = std::end(state.m_otherStacks);
+void GraphState::CalculateElsewhere(DGNode const& node) {
+  auto& stacks = NeedRest().m_otherStacks;
   CalculationStack* const next =
-      std::find_if(std::begin(state.m_otherStacks), end, [](CalculationStack& stack) { return stack.Open(); });
-  if (next == end) {
-    state.m_deep = this;
+      std::find_if(std::begin(stacks), std::end(stacks), [](CalculationStack& stack) { return stack.Open(); });
+  if (next == std::end(stacks)) {
+    m_deep = &node;
     throw DeepRead();
   }
   struct Stack {
@@ -160,10 +160,10 @@ void DGNode::CalculateElsewhere(GraphState& state) const {
     }
     GraphState& m_state;
     std::uintptr_t m_stack = m_state.m_stack, m_most = m_state.m_mostStack;
-  } stack{state};
+  } stack{*this};
   const auto calculate = [&] {
-    state.MeasureStack(next->Usable());
-    CalculateHere(state);
+    MeasureStack(next->Usable());
+    CalculateHere(node);
   };
   next->Run(calculate);
 }

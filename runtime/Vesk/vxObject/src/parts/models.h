@@ -113,7 +113,7 @@ void ModelHook::Release(Called const& called) {
 }
 
 struct ModelHook::Use {
-  explicit Use(NodePlace const* place) : m_called(const_cast<Called&>(*static_cast<Called const*>(place))) {
+  explicit Use(DGPlace const* place) : m_called(const_cast<Called&>(*static_cast<Called const*>(place))) {
     ++m_called.m_users;
   }
   ~Use() { Release(m_called); }
@@ -124,7 +124,7 @@ struct ModelHook::Use {
 void ModelHook::Notify(ModelChange const& change) {
   Hooks& hooks = Hooks::Get();
   const std::size_t last = hooks.m_lastSerial;
-  for (NodePlace const* at = hooks.m_list.First(); at != hooks.m_list.End();) {
+  for (DGPlace const* at = hooks.m_list.First(); at != hooks.m_list.End();) {
     const Use use(at);
     if (use.m_called.m_serial > last) break;
     if (!use.m_called.m_isOver) use.m_called.m_function(change);

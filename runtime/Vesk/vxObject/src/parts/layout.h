@@ -1,7 +1,7 @@
 // The layout of records as text, and the modules that they stand in.
 
 @import "Vesk/vxObject/Layout.h"
-@import "shared.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <cstring>
 #if defined(__linux__)

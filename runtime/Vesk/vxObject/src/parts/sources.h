@@ -9,14 +9,15 @@
 
 namespace vesk {
 
-// Sources that nobody reads any more. The last few are kept: what is written is most often read again soon.
-struct IdlePlace : NodePlace {};
+// Sources that are kept though nobody reads them: what is written is most often read again soon. Those that are read
+// while they are here stay until it is their turn to go.
+struct IdlePlace : DGPlace {};
 class Source;
 struct IdleSources : PerThread<IdleSources> {
   enum { Most = 64 };
   ~IdleSources();
   void MakeRoom() {
-    if (m_count >= Most) DropOldest();
+    while (m_count >= Most) DropOldest();
   }
   void Add(Source const& source);
   void DropOldest();
@@ -25,16 +26,9 @@ struct IdleSources : PerThread<IdleSources> {
   ssize_t m_count = 0;
 };
 
-class Source : public DGIndepNode, private IdlePlace {
- protected:
-  explicit Source(IdleSources& idle) { idle.Add(*this); }
-  ~Source() override { Leave(); }
-
-  void Read(GraphState& state) const {
-    Link(state);
-    Leave();
-  }
-  void OnNoDependents() const override {
+class Source : public DGNode, private IdlePlace {
+ public:
+  void OnUnread() const {
     if (m_idle) return;
     if (IdleSources* idle = IdleSources::Peek()) {
       idle->MakeRoom();
@@ -44,25 +38,36 @@ class Source : public DGIndepNode, private IdlePlace {
     }
   }
 
+ protected:
+  explicit Source(IdleSources& idle) : DGNode(DF_SOURCE) { idle.Add(*this); }
+  ~Source() override { LeaveIdle(); }
+
  private:
   friend struct IdleSources;
-  void Leave() const {
+  void LeaveIdle() const {
     if (IdleSources* idle = std::exchange(m_idle, nullptr)) --idle->m_count;
-    IdlePlace::Leave();
+    Leave(static_cast<IdlePlace const&>(*this));
   }
   mutable IdleSources* m_idle = nullptr;
 };
+
+void GraphState::OnSourceUnread(DGNode const& source) { static_cast<Source const&>(source).OnUnread(); }
 
 IdleSources::~IdleSources() {
   while (m_count > 0) DropOldest();
 }
 void IdleSources::Add(Source const& source) {
-  if (source.m_idle) return;
   source.m_idle = this;
   m_list.Append(source);
   ++m_count;
 }
-void IdleSources::DropOldest() { delete static_cast<Source const*>(static_cast<IdlePlace const*>(m_list.First())); }
+void IdleSources::DropOldest() {
+  Source const* const source = static_cast<Source const*>(static_cast<IdlePlace const*>(m_list.First()));
+  source->LeaveIdle();
+  if (!GraphState::IsRead(*source)) delete source;
+}
+
+typedef GraphState::Changes Changes;
 
 class DataNode : public Source {
  public:
@@ -77,9 +82,9 @@ class DataNode : public Source {
     AddressMap& addresses = table.m_bySize[SizeClass(size)];
     octet_t const* address = static_cast<octet_t const*>(begin);
     for (auto [at, end] = addresses.equal_range(address); at != end; ++at) {
-      if (at->second->m_size == size && at->second->m_name->first == name) return at->second->Read(state);
+      if (at->second->m_size == size && at->second->m_name->first == name) return state.Link(*at->second);
     }
-    (new DataNode(idle, table, addresses, address, size, object, name))->Read(state);
+    state.Link(*new DataNode(idle, table, addresses, address, size, object, name));
   }
 
   static void OnWrite(void const* begin, std::size_t size, void const* object, ConstStringZ name) {
@@ -88,7 +93,7 @@ class DataNode : public Source {
     Changes found;
     table->FindMemory(static_cast<octet_t const*>(begin), size, found);
     if (name) table->FindField(object, name, found);
-    if (!found.IsEmpty()) Change(found);
+    if (!found.IsEmpty()) GraphState::Get().Change(found);
   }
 
  private:
@@ -116,7 +121,7 @@ class DataNode : public Source {
         const std::uintptr_t from = number > most ? number - most : 0;
         auto at = addresses.lower_bound(reinterpret_cast<octet_t const*>(from));
         for (; at != addresses.end() && at->first < address + size; ++at) {
-          if (at->first + at->second->m_size > address) at->second->Join(found);
+          if (at->first + at->second->m_size > address) GraphState::Join(*at->second, found);
         }
       }
     }
@@ -156,7 +161,7 @@ class DataNode : public Source {
     }
 
     static void JoinAll(std::list<DataNode*> const& sources, Changes& found) {
-      for (DataNode const* source : sources) source->Join(found);
+      for (DataNode const* source : sources) GraphState::Join(*source, found);
     }
 
     std::map<int, AddressMap> m_bySize;
@@ -211,24 +216,26 @@ class PathNode : public Source {
   static void OnRead(void const* object, Path const& path) {
     GraphState& state = GraphState::Get();
     if (state.m_calculation->Owns(object)) return;
-    IdleSources& idle = IdleSources::Get();
-    idle.MakeRoom();
     Table& table = Table::Get();
-    PathMap& paths = table.Make(object);
-    const auto at = paths.find(Bytes(path));
-    PathNode const* node = at != paths.end() ? at->second : new PathNode(idle, table, object, paths, Bytes(path));
-    node->Read(state);
+    Paths* paths = table.Find(object);
+    PathNode const* node = paths ? paths->Find(path) : nullptr;
+    state.Link(node ? *node : *Make(table, object, path));
   }
 
   static void OnWrite(void const* object, Path const& path) {
     Table* table = Table::Peek();
-    if (!table) return;
-    PathMap const* paths = table->Find(object);
-    if (!paths) return;
+    Paths const* paths = table ? table->Find(object) : nullptr;
+    if (!paths) {
+      PathSource::s_unread = object;
+      return;
+    }
+    if (paths->m_others.empty() && IsField(path)) {
+      if (PathNode const* node = paths->m_ofField[path.Data()[0]]) GraphState::Change(*node);
+      return;
+    }
     Changes found;
-    FindInside(*paths, Bytes(path), found);
-    FindAround(*paths, Bytes(path), found);
-    if (!found.IsEmpty()) Change(found);
+    paths->FindMet(path, found);
+    if (!found.IsEmpty()) GraphState::Get().Change(found);
   }
 
  private:
@@ -244,16 +251,46 @@ class PathNode : public Source {
     }
   };
   typedef std::map<std::string, PathNode*, PathLess> PathMap;
+
+  // Most paths are those of one of a model's first fields.
+  static bool IsField(Path const& path) { return path.Size() == 1 && path.Data()[0] < NumFields; }
+  enum { NumFields = 16 };
+
+  // The nodes of one object.
+  struct Paths {
+    PathNode const* Find(Path const& path) const {
+      if (IsField(path)) return m_ofField[path.Data()[0]];
+      const auto at = m_others.find(Bytes(path));
+      return at != m_others.end() ? at->second : nullptr;
+    }
+    // Those of a path, of what is inside and of what is around it.
+    void FindMet(Path const& path, Changes& found) const {
+      if (path.Size() > 0 && path.Data()[0] < NumFields) {
+        if (PathNode const* node = m_ofField[path.Data()[0]]) GraphState::Join(*node, found);
+      } else if (path.Size() == 0) {
+        for (PathNode const* node : m_ofField) {
+          if (node) GraphState::Join(*node, found);
+        }
+      }
+      FindInside(m_others, Bytes(path), found);
+      FindAround(m_others, Bytes(path), found);
+    }
+
+    PathNode* m_ofField[NumFields] = {};
+    PathMap m_others;
+    ssize_t m_count = 0;  // of all
+  };
+
   struct Table : PerThread<Table> {
     // Those of an object, which is most often the one of the last call.
-    PathMap* Find(void const* object) {
+    Paths* Find(void const* object) {
       if (m_lastPaths && m_lastObject == object) return m_lastPaths;
       const auto at = m_byObject.find(object);
       return at != m_byObject.end() ? Remember(object, at->second) : nullptr;
     }
-    PathMap& Make(void const* object) {
-      PathMap* paths = Find(object);
-      return paths ? *paths : *Remember(object, m_byObject[object]);
+    Paths& Make(void const* object) {
+      if (PathSource::s_unread == object) PathSource::s_unread = nullptr;
+      return *Remember(object, m_byObject[object]);
     }
     void Drop(void const* object) {
       m_lastPaths = nullptr;
@@ -261,23 +298,40 @@ class PathNode : public Source {
     }
 
    private:
-    PathMap* Remember(void const* object, PathMap& paths) {
+    Paths* Remember(void const* object, Paths& paths) {
       m_lastObject = object;
       return m_lastPaths = &paths;
     }
-    std::unordered_map<void const*, PathMap> m_byObject;
+    std::unordered_map<void const*, Paths> m_byObject;
     void const* m_lastObject = nullptr;
-    PathMap* m_lastPaths = nullptr;
+    Paths* m_lastPaths = nullptr;
   };
 
-  PathNode(IdleSources& idle, Table& table, void const* object, PathMap& paths, std::string_view path)
+  static PathNode* Make(Table& table, void const* object, Path const& path) {
+    IdleSources& idle = IdleSources::Get();
+    idle.MakeRoom();
+    Paths& paths = table.Make(object);
+    return new PathNode(idle, table, object, paths, path);
+  }
+
+  PathNode(IdleSources& idle, Table& table, void const* object, Paths& paths, Path const& path)
       : Source(idle), m_table(table), m_object(object), m_paths(paths) {
-    m_place = paths.emplace(path, this).first;
+    if (IsField(path)) {
+      m_field = path.Data()[0];
+      paths.m_ofField[m_field] = this;
+    } else {
+      m_place = paths.m_others.emplace(Bytes(path), this).first;
+    }
+    ++paths.m_count;
     table.Use();
   }
   ~PathNode() override {
-    m_paths.erase(m_place);
-    if (m_paths.empty()) m_table.Drop(m_object);
+    if (m_field >= 0) {
+      m_paths.m_ofField[m_field] = nullptr;
+    } else {
+      m_paths.m_others.erase(m_place);
+    }
+    if (--m_paths.m_count == 0) m_table.Drop(m_object);
     m_table.Release();
   }
 
@@ -289,7 +343,7 @@ class PathNode : public Source {
   static void FindInside(PathMap const& paths, std::string_view path, Changes& found) {
     for (auto at = paths.lower_bound(path); at != paths.end(); ++at) {
       if (std::string_view(at->first).substr(0, path.size()) != path) return;
-      at->second->Join(found);
+      GraphState::Join(*at->second, found);
     }
   }
 
@@ -301,7 +355,7 @@ class PathNode : public Source {
       std::size_t same = 0;
       while (same < most && nearest[same] == path[same]) ++same;
       if (same == nearest.size()) {
-        at->second->Join(found);
+        GraphState::Join(*at->second, found);
       } else {
         at = paths.upper_bound(path = path.substr(0, same));
       }
@@ -310,8 +364,9 @@ class PathNode : public Source {
 
   Table& m_table;
   void const* m_object;
-  PathMap& m_paths;
-  PathMap::iterator m_place;
+  Paths& m_paths;
+  int m_field = -1;
+  PathMap::iterator m_place;  // of one without a field
 };
 
 template <typename Node, typename... Args>
@@ -332,6 +387,6 @@ void DataSource::OnWrite(void const* begin, std::size_t size, void const* object
 }
 
 void PathSource::Read(void const* object, Path const& path) { ReadSource<PathNode>(object, path); }
-void PathSource::OnWrite(void const* object, Path const& path) { PathNode::OnWrite(object, path); }
+void PathSource::Write(void const* object, Path const& path) { PathNode::OnWrite(object, path); }
 
 }  // namespace vesk

@@ -1,7 +1,7 @@
 // The tables of what is registered.
 
 @import "Vesk/vxObject/Registry.h"
-@import "shared.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <cstring>
 #include <mutex>
@@ -29,51 +29,67 @@ xvector<XTarget const*> AllTargets() {
 
 // --- Records
 
-template <typename R>
 struct RegisteredRecord {
-  R const* m_record;
+  void const* m_record;
   XTarget* m_target;
 };
+// By name: the record in use in front, behind it the copies of it that other modules of the process have. Of all kinds,
+// as the compiler takes a while over each map.
+typedef std::vector<RegisteredRecord> Registered;
+typedef std::map<std::string, Registered> RecordTable;
 
-// By name: the record in use in front, behind it the copies of it that other modules of the process have.
 template <typename R>
-std::map<std::string, std::vector<RegisteredRecord<R>>>& RecordTable() {
-  return Shared<std::map<std::string, std::vector<RegisteredRecord<R>>>>();
+struct TableOf {
+  RecordTable m_table;
+  static RecordTable& Get() { return Shared<TableOf<R>>().m_table; }
+};
+
+enum class EAdded { New, Known, Refused };
+
+// `isLike`: whether another one of its name is of the same layout.
+static EAdded AddRecord(Registered& records, RegisteredRecord record, bool (*isLike)(void const*, void const*)) {
+  for (RegisteredRecord const& registered : records) {
+    if (registered.m_record == record.m_record) return EAdded::Known;
+  }
+  if (!records.empty() && !isLike(records.front().m_record, record.m_record)) return EAdded::Refused;
+  records.push_back(record);
+  return EAdded::New;
+}
+static RegisteredRecord FindRecord(RecordTable const& table, std::string const& name) {
+  const auto at = table.find(name);
+  return at == table.end() || at->second.empty() ? RegisteredRecord{nullptr, nullptr} : at->second.front();
 }
 
+template <typename R>
+bool IsLike(void const* a, void const* b) {
+  return LayoutText(*static_cast<R const*>(a)) == LayoutText(*static_cast<R const*>(b));
+}
 template <typename R>
 NSE RegisterRecord(R const* record, XTarget* target) {
-  std::vector<RegisteredRecord<R>>& records = RecordTable<R>()[record->m_name];
-  for (RegisteredRecord<R> const& registered : records) {
-    if (registered.m_record == record) return NSE_OK;
-  }
-  if (!records.empty() && LayoutText(*records.front().m_record) != LayoutText(*record)) return NSE_ALREADY_DEFINED;
-  records.push_back({record, target});
+  const EAdded added = AddRecord(TableOf<R>::Get()[record->m_name], {record, target}, IsLike<R>);
   if constexpr (std::is_same<R, ReflectedClass>::value) {
-    if (!target->m_latestModel || LastRelease(*target->m_latestModel) < LastRelease(*record)) {
-      target->m_latestModel = record;
+    if (added == EAdded::New) {
+      ReflectedClass const*& latest = target->m_latestModel;
+      if (!latest || LastRelease(*latest) < LastRelease(*record)) latest = record;
     }
   }
-  return NSE_OK;
+  return added == EAdded::Refused ? NSE_ALREADY_DEFINED : NSE_OK;
 }
-
 template <typename R>
 R const* Find(std::string const& name) {
-  const auto at = RecordTable<R>().find(name);
-  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_record;
+  return static_cast<R const*>(FindRecord(TableOf<R>::Get(), name).m_record);
 }
-
 template <typename R>
 xvector<R const*> All() {
   xvector<R const*> records;
-  for (auto const& [name, registered] : RecordTable<R>()) records.push_back(registered.front().m_record);
+  for (auto const& [name, registered] : TableOf<R>::Get()) {
+    if (!registered.empty()) records.push_back(static_cast<R const*>(registered.front().m_record));
+  }
   return records;
 }
-
 template <typename R>
 XTarget* TargetOf(R const& record) {
-  const auto at = RecordTable<R>().find(record.m_name);
-  return at == RecordTable<R>().end() ? nullptr : at->second.front().m_target;
+  return FindRecord(TableOf<R>::Get(), record.m_name).m_target;
 }
 
 // --- Types
@@ -138,13 +154,11 @@ void PrintValue(xostream& os, ReflectedType const& type, void const* value) {
 
 // --- Unloading
 
-template <typename R>
-void UnregisterRecords(XTarget const* target) {
-  auto& table = RecordTable<R>();
+static void UnregisterRecords(RecordTable& table, XTarget const* target) {
   for (auto at = table.begin(); at != table.end();) {
-    std::vector<RegisteredRecord<R>>& records = at->second;
+    Registered& records = at->second;
     records.erase(std::remove_if(records.begin(), records.end(),
-                                 [=](RegisteredRecord<R> const& record) { return record.m_target == target; }),
+                                 [=](RegisteredRecord const& record) { return record.m_target == target; }),
                   records.end());
     at = records.empty() ? table.erase(at) : std::next(at);
   }
@@ -184,15 +198,15 @@ XTarget::~XTarget() {
 VESK_RECORD_KINDS(VESK_DEFINE)
 
 // A project that has records, and none of them is registered, is one whose registration was forgotten.
-template <typename R>
-bool HasRecords(XTarget const* target) {
-  auto const& table = RecordTable<R>();
-  return std::any_of(table.begin(), table.end(), [target](auto const& named) {
-    return std::any_of(named.second.begin(), named.second.end(),
-                       [target](RegisteredRecord<R> const& record) { return record.m_target == target; });
-  });
+static bool HasRecords(RecordTable const& table, XTarget const* target) {
+  for (auto const& [name, records] : table) {
+    for (RegisteredRecord const& record : records) {
+      if (record.m_target == target) return true;
+    }
+  }
+  return false;
 }
-#define VESK_OR_HAS_RECORDS(R) || HasRecords<R>(target)
+#define VESK_OR_HAS_RECORDS(R) || HasRecords(TableOf<R>::Get(), target)
 
 xstring NotRegistered(std::string_view what, std::string const& name) {
   xstring calls;
@@ -210,7 +224,7 @@ xstring NotRegistered(std::string_view what, std::string const& name) {
   return text;
 }
 
-#define VESK_UNREGISTER(R) UnregisterRecords<R>(target);
+#define VESK_UNREGISTER(R) UnregisterRecords(TableOf<R>::Get(), target);
 void UnregisterTarget(XTarget const* target) { VESK_RECORD_KINDS(VESK_UNREGISTER) }
 
 }  // namespace vesk

@@ -1,6 +1,6 @@
 // Reads values from JSON.
 
-@import "json_scalars.h"
+@import "Vesk/vxObject/src/json_scalars.h"
 
 #include <charconv>
 

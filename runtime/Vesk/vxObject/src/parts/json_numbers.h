@@ -1,6 +1,6 @@
 // Numbers, bools, characters and labels in JSON.
 
-@import "json_scalars.h"
+@import "Vesk/vxObject/src/json_scalars.h"
 
 #include <charconv>
 #include <limits>

@@ -327,7 +327,7 @@ struct ValueSeeker : IObjectVisitor {
 
 DGIndepNode* IndepNodeAt(ReflectedClass const& record, void* object, ValueField const& field) {
   if (field.m_offset + sizeof(DGIndepNode) > record.m_size) return nullptr;
-  return DGIndepNode::At(static_cast<octet_t*>(object) + field.m_offset);
+  return IndepNodeAt(static_cast<octet_t*>(object) + field.m_offset);
 }
 
 // The value is the last thing before its node: at the node's address less its size, or somewhat further away where the

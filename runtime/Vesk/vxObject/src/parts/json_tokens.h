@@ -1,6 +1,6 @@
 // What is JSON, and its tokens.
 
-@import "json_scanner.h"
+@import "Vesk/vxObject/src/json_scanner.h"
 
 namespace vesk {
 

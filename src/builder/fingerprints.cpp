@@ -1,0 +1,163 @@
+#include "builder/fingerprints.h"
+
+#include <algorithm>
+
+#include "text/numbers.h"
+#include "text/paths.h"
+#include "text/text_writer.h"
+
+namespace qrex {
+
+namespace {
+
+constexpr uint32_t kMagic = 0x2AEF78F2;
+
+void AppendNumber(std::string& out, uint64_t value) {
+  for (int i = 0; i < 8; ++i) out += static_cast<char>(value >> (8 * i));
+}
+
+void Append(std::string& out, const FileStamp& stamp) {
+  AppendNumber(out, static_cast<uint64_t>(stamp.time));
+  AppendNumber(out, stamp.size);
+}
+
+void Append(std::string& out, const OutputPrint& made) {
+  AppendNumber(out, made.print);
+  Append(out, made.stamp);
+}
+
+// Reads the payload piece by piece; whatever does not fit raises.
+class PayloadReader {
+ public:
+  explicit PayloadReader(std::string_view payload) : m_rest(payload) {}
+
+  uint64_t Number() {
+    if (m_rest.size() < 8) throw DeserialisationException();
+    uint64_t value = 0;
+    for (size_t i = 8; i-- > 0;) value = value << 8 | static_cast<unsigned char>(m_rest[i]);
+    m_rest.remove_prefix(8);
+    return value;
+  }
+  FileStamp Stamp() {
+    const uint64_t time = Number();
+    return {static_cast<int64_t>(time), Number()};
+  }
+  OutputPrint Print() {
+    const uint64_t print = Number();
+    return {print, Stamp()};
+  }
+  std::string_view String() {
+    std::string_view text;
+    if (!ReadCompactString(m_rest, text)) throw DeserialisationException();
+    return text;
+  }
+
+ private:
+  std::string_view m_rest;
+};
+
+}  // namespace
+
+PrintMixer& PrintMixer::Add(std::string_view text) {
+  Add(text.size());
+  for (; !text.empty(); text.remove_prefix(std::min<size_t>(text.size(), 8))) {
+    uint64_t word = 0;
+    for (const char c : text.substr(0, 8)) word = word << 8 | static_cast<unsigned char>(c);
+    Add(word);
+  }
+  return *this;
+}
+
+void Fingerprints::Load(BuildFiles& builder, const std::string& path) {
+  std::string payload;
+  if (!ReadCheckedFile(kMagic, payload, path)) return;
+  m_files.resize(builder.FileCount());
+  try {
+    PayloadReader reader(payload);
+    m_keys = reader.String();
+    m_command = reader.String();
+    for (uint64_t count = reader.Number(); count > 0; --count) {
+      const auto file = builder.scannedByPath.find(reader.String());
+      File known;
+      known.source = reader.Stamp();
+      known.translation = reader.Print();
+      known.object = reader.Print();
+      if (file != builder.scannedByPath.end()) At(*file->second) = known;
+    }
+    for (uint64_t count = reader.Number(); count > 0; --count) {
+      std::string output(reader.String());
+      m_others[std::move(output)] = reader.Print();
+    }
+  } catch (const DeserialisationException&) {
+    m_files.clear();
+    m_others.clear();
+  }
+}
+
+void Fingerprints::Save(BuildFiles& builder, const std::string& path) {
+  if (!m_hasChanged) return;
+  std::vector<const ScannedFile*> files(builder.scanned.begin(), builder.scanned.end());
+  std::sort(files.begin(), files.end(), [](const auto* a, const auto* b) { return a->file.path < b->file.path; });
+  std::string payload;
+  AppendCompactString(payload, m_keys);
+  AppendCompactString(payload, m_command);
+  AppendNumber(payload, files.size());
+  for (const ScannedFile* file : files) {
+    const File& known = Of(*file);
+    AppendCompactString(payload, file->file.path);
+    Append(payload, known.source);
+    Append(payload, known.translation);
+    Append(payload, known.object);
+  }
+  AppendNumber(payload, m_others.size());
+  for (const auto& [output, made] : m_others) {
+    AppendCompactString(payload, output);
+    Append(payload, made);
+  }
+  CreateDirectories(path, false);
+  builder.settings.leftovers.Beside(path);
+  try {
+    WriteCheckedFile(kMagic, payload, path);
+    m_hasChanged = false;
+  } catch (const FileException&) {
+    TraceWriter() << "*** Couldn't save fingerprints " << path << "\n";
+  }
+}
+
+const Fingerprints::File& Fingerprints::Of(const ScannedFile& file) const {
+  static const File kUnknown;
+  return file.index < m_files.size() ? m_files[file.index] : kUnknown;
+}
+
+const OutputPrint& Fingerprints::Of(const std::string& output) const {
+  static const OutputPrint kUnknown;
+  const auto known = m_others.find(output);
+  return known == m_others.end() ? kUnknown : known->second;
+}
+
+Fingerprints::File& Fingerprints::At(const ScannedFile& file) {
+  if (file.index >= m_files.size()) m_files.resize(file.index + 1);
+  return m_files[file.index];
+}
+
+void Fingerprints::Note(const ScannedFile& file, const FileStamp& source, const OutputPrint& translation) {
+  Set(At(file).source, source);
+  Set(At(file).translation, translation);
+}
+
+void Fingerprints::NoteObject(const ScannedFile& file, const OutputPrint& object) { Set(At(file).object, object); }
+
+void Fingerprints::Note(const std::string& output, const OutputPrint& made) { Set(m_others[output], made); }
+
+void Fingerprints::SetTexts(std::string keys, std::string command) {
+  Set(m_keys, keys);
+  Set(m_command, command);
+}
+
+std::string FingerprintPath(const std::string& dependencyFile) {
+  std::string path;
+  ReplaceExtension(dependencyFile, "qrexprint", path);
+  return path;
+}
+
+}  // namespace qrex

@@ -1,0 +1,42 @@
+// The fingerprints of a project in a configuration: of its translated files, objects and target.
+#pragma once
+
+#include <cstdint>
+#include <string>
+#include <string_view>
+#include <vector>
+
+#include "builder/build_files.h"
+#include "builder/fingerprints.h"
+
+namespace qrex {
+
+class ProjectPrints {
+ public:
+  ProjectPrints(BuildFiles& builder, const std::string& dependencyFile);
+
+  // Whether an output is not what was noted, or was made from something else than what there is now.
+  bool DiffersTranslated(ScannedFile& file) const;
+  bool DiffersObject(ScannedFile& file, const FileStamp& stamp) const;
+  bool Differs(const std::string& output, uint64_t print, const FileStamp& stamp) const;
+
+  uint64_t ObjectPrint(ScannedFile& file) const;
+  uint64_t ResourcePrint(const FileStamp& source) const;
+  uint64_t TargetPrint(std::string_view command, const std::vector<FileStamp>& inputs) const;
+
+  // Print 0: it could not be made.
+  void Made(const ScannedFile& file, const OutputPrint& object) { m_known.NoteObject(file, object); }
+  void Made(const std::string& output, const OutputPrint& made) { m_known.Note(output, made); }
+  void Save();  // with what has been translated
+
+ private:
+  uint64_t TranslationPrint(ScannedFile& file) const;
+  uint64_t CommandPrint(const ProjectFile& file) const;
+
+  BuildFiles& m_builder;
+  const std::string m_path;
+  Fingerprints m_known;
+  uint64_t m_keys = 0, m_command = 0;
+};
+
+}  // namespace qrex

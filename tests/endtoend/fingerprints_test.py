@@ -1,0 +1,138 @@
+#!/usr/bin/env python3
+"""What a build depends on beside the age of files: commands, keys, and inputs that became older."""
+
+import os
+import sys
+import time
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, equal, in_workspace, run_tests  # noqa: E402
+
+# An object tells its command and source, a library or program what went into it.
+COMPILER = """#!/bin/sh
+text=$(tr -d '\\r' < "${2#@}"); object=${text#*-o \\"}; object=${object%%\\"*}; source=${text##* \\"}; source=${source%\\"}
+{ echo "$(basename $0) $text"; cat "$source"; } > "$object"
+"""
+LIBRARIAN = '#!/bin/sh\ncat $(tr -d \'"\\r\' < "${3#@}") > "$2"\n'
+LINKER = """#!/bin/sh
+text=$(tr -d '"\\r' < "${1#@}"); set -- $text; target=$2; shift 2
+{ echo "$text"; for word; do [ ! -f "$word" ] || cat "$word"; done; } > "$target"
+"""
+PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n+cpp { %s }\n%s\nqrex\n{ %s }\n'
+FILES = {
+    "all.qrex": SETTINGS + "fingerprints = true\nwriteTokenEquivalent = false\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "lib" "app" }\n',
+    "tools/gcc-4": COMPILER, "tools/clang": COMPILER, "tools/ar": LIBRARIAN, "tools/g++": LINKER, "tools/clang++": LINKER,
+    "tree/lib/src/lib.qrpj": PROJECT % ("Static Library", "lib", "-O1", "", '"lib.h" "src" { "lib.cpp" "more.cpp" }'),
+    "tree/lib/lib.h": "int lib;\n", "tree/lib/src/lib.cpp": '@import "lib.h"\nint of_lib;\n',
+    "tree/lib/src/more.cpp": "int more;\n",
+    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", "-O1", 'subproj { "lib" }\n+link { -lm }',
+                                        '"src" { "app.cpp" }'),
+    "tree/app/src/app.cpp": '@import "lib/lib.h"\nint app;\n',
+}
+MADE = ("x64/**/*.o", "out/lib/**/*", "qrexsource/**/*.cpp", "qrexsource/**/*.h")
+
+
+def build(workspace, *arguments):
+    """The names of what was made."""
+    before = {}
+    for pattern in MADE:
+        before.update(workspace.times(pattern))
+    workspace.run("all.qrex", *arguments)
+    changed = {name for pattern in MADE for name in workspace.changed(before, pattern)}
+    return sorted(Path(name).name for name in changed if workspace.path(name).is_file())
+
+
+def age(workspace, name, seconds):
+    os.utime(workspace.path(name), (time.time() + seconds,) * 2)
+
+
+@in_workspace(FILES)
+def test_whatever_differs_is_made_again(workspace):
+    for name in workspace.times("tree/**/*"):
+        age(workspace, name, -1000)
+    build(workspace)
+    equal(build(workspace), [])
+    equal(build(workspace, "jobs=4", "keepGoing=true", "commandFiles=false"), [])  # these change nothing
+    # Switches of compilers and linkers, and the compiler itself.
+    workspace.replace("tree/lib/src/lib.qrpj", "-O1", "-O2")
+    equal(build(workspace), ["app", "lib.o", "liblib.a", "more.o"])
+    workspace.replace("tree/app/src/app.qrpj", "-lm", "-lrt")
+    equal(build(workspace), ["app"])
+    equal(build(workspace, "compiler=clang"), ["app"])  # which has another linker alone
+    equal(build(workspace), ["app"])
+    workspace.append("tools/gcc-4", "# of another release\n")
+    equal(build(workspace), ["app", "app.o", "lib.o", "liblib.a", "more.o"])
+    # A key of translations: the same texts come of it, so that nothing is compiled.
+    before = workspace.path("qrexsource/x64/Debug/app.qrexprint").read_bytes()
+    equal([name for name in build(workspace, "modernCpp=true") if not name.endswith((".cpp", ".h"))], [])
+    assert workspace.path("qrexsource/x64/Debug/app.qrexprint").read_bytes() != before
+    build(workspace)
+    # A source that an older one replaced, a header as well.
+    workspace.write("tree/lib/src/more.cpp", "int fewer;\n")
+    age(workspace, "tree/lib/src/more.cpp", -2000)
+    equal(build(workspace), ["app", "liblib.a", "more.cpp", "more.o"])
+    workspace.write("tree/lib/lib.h", "int old;\n")
+    age(workspace, "tree/lib/lib.h", -2000)
+    equal([name for name in build(workspace) if name.endswith((".o", ".a", ".h", "app"))],
+          ["app", "app.o", "lib.h", "lib.o", "liblib.a"])
+    # What was written over outputs.
+    workspace.path("out/lib/x64/Debug/app").write_text("other")
+    equal(build(workspace), ["app"])
+    workspace.path("x64/Debug/lib/more.o").write_text("other")
+    equal(build(workspace), ["app", "liblib.a", "more.o"])
+    equal(build(workspace), [])
+
+
+@in_workspace(FILES)
+def test_a_clock_that_was_ahead(workspace):
+    # Built while the clock was an hour ahead; then it is set right, and a source is saved.
+    build(workspace)
+    for pattern in ("tree/**/*", *MADE, "qrexsource/**/*"):
+        for name in workspace.times(pattern):
+            age(workspace, name, -3600)
+    build(workspace)
+    workspace.write("tree/app/src/app.cpp", "int late;\n")
+    age(workspace, "tree/app/src/app.cpp", -5000)
+    equal(build(workspace), ["app", "app.cpp", "app.o"])
+
+
+@in_workspace(FILES)
+def test_damaged_prints_are_made_anew(workspace):
+    build(workspace)
+    for content in (b"", b"rubbish" * 9, workspace.path("qrexsource/x64/Debug/lib.qrexprint").read_bytes()[:-3]):
+        workspace.path("qrexsource/x64/Debug/lib.qrexprint").write_bytes(content)
+        assert "lib.o" in build(workspace)
+        equal(build(workspace), [])
+    workspace.run("all.qrex", "mode=clean")
+    assert not workspace.times("qrexsource/**/*.qrexprint")
+
+
+@in_workspace(FILES)
+def test_without_the_key_age_alone_counts(workspace):
+    build(workspace, "fingerprints=false")
+    equal(workspace.times("qrexsource/**/*.qrexprint"), {})
+    workspace.replace("tree/lib/src/lib.qrpj", "-O1", "-O2")
+    equal(build(workspace, "fingerprints=false"), [])
+
+
+@in_workspace({
+    "all.qrex": SETTINGS + "fingerprints = true\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n',
+    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", "-MMD -DNUMBER=1", "", '"src" { "app.cpp" "more.cpp" }'),
+    "tree/app/src/app.cpp": "#include <cstdio>\nint more();\nint main() { std::printf(\"%d\\n\", more()); }\n",
+    "tree/app/src/more.cpp": "int more() { return NUMBER; }\n"}, "make", "g++")
+def test_make_compiles_for_another_switch(workspace):
+    for number in (1, 2):
+        if number == 2:
+            workspace.replace("tree/app/src/app.qrpj", "NUMBER=1", "NUMBER=2")
+        workspace.run("all.qrex", "mode=gen")
+        workspace.shell("make d")
+        equal(workspace.shell("out/lib/x64/Debug/app"), f"{number}\n")
+        objects = workspace.times("x64/**/*.o")
+        workspace.run("all.qrex", "mode=gen")
+        workspace.shell("make d")
+        equal(workspace.changed(objects, "x64/**/*.o"), [])
+
+
+run_tests([test_whatever_differs_is_made_again, test_a_clock_that_was_ahead, test_damaged_prints_are_made_anew,
+           test_without_the_key_age_alone_counts, test_make_compiles_for_another_switch])
