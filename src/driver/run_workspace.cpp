@@ -32,9 +32,12 @@ namespace {
 
 constexpr char kMarkerFile[] = ".qrwsroot";
 
+enum class LoadedTo { Run, Ask };  // a question writes nothing
+
 class WorkspaceRun {
  public:
-  explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
+  explicit WorkspaceRun(ConfigSettings& settings, LoadedTo purpose = LoadedTo::Run)
+      : m_settings(settings), m_purpose(purpose), m_workspace(settings) {}
   bool LoadAll();
   bool Run(ScopeTimer& timer);
   Workspace& Loaded() { return m_workspace; }
@@ -59,6 +62,7 @@ class WorkspaceRun {
   ProjectConfig* FindProjectConfig(const Project& project) const;
 
   ConfigSettings& m_settings;
+  const LoadedTo m_purpose;
   Workspace m_workspace;
   Generator m_generator{m_settings.leftovers};
   ProjectQueue m_queue{m_settings};
@@ -114,7 +118,9 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
                         .WithHint(TriedInTree(m_settings, entry)));
     return false;
   }
-  CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
+  if (m_purpose == LoadedTo::Run) {
+    CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
+  }
   const size_t slash = entry.rfind('/');
   m_workspace.relativeDir = slash == std::string::npos ? std::string() : entry.substr(0, slash);
   WorkspaceParser parser(m_workspace, fullPath);
@@ -455,7 +461,7 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
 
 bool ListWorkspace(ConfigSettings& settings, std::string& list) {
   if (!CheckPathSyntax(settings)) return false;
-  WorkspaceRun run(settings);
+  WorkspaceRun run(settings, LoadedTo::Ask);
   if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
   list = ListingOf(run.Loaded());
   return true;
@@ -463,7 +469,7 @@ bool ListWorkspace(ConfigSettings& settings, std::string& list) {
 
 bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions) {
   if (!CheckPathSyntax(settings)) return false;
-  WorkspaceRun run(settings);
+  WorkspaceRun run(settings, LoadedTo::Ask);
   if (!run.LoadAll()) return false;
   PositionFilter filter(run.Loaded(), follow);
   if (positions.empty()) filter.Run();

@@ -65,6 +65,15 @@ def there_and_back(workspace):
 
 
 @in_workspace(FILES)
+def questions_write_nothing(workspace):
+    before = workspace.times("**/*")
+    filtered(workspace, f"{OUT}app.cpp:3\n".encode())
+    workspace.run("--there", "all.qrex", "tree/app/src/app.cpp:3")
+    workspace.run("--list", "all.qrex")
+    equal(workspace.times("**/*"), before)
+
+
+@in_workspace(FILES)
 def columns(workspace):
     """They stay with their word; an indentation that came on the way is taken off."""
     workspace.run("all.qrex")
@@ -154,4 +163,4 @@ def real_tools(workspace):
     holds(told, "twice_as (unused=1) at tree/app/src/a.h:5", "main () at tree/app/src/app.cpp:4")
 
 
-run_tests([there_and_back, columns, filter_forms, stale, errors, speed, real_tools])
+run_tests([there_and_back, questions_write_nothing, columns, filter_forms, stale, errors, speed, real_tools])
