@@ -171,7 +171,29 @@ int CommandLine::RunList() {
   return isMade ? 0 : 1;
 }
 
+int CommandLine::RunFollow(Follow follow, const std::vector<std::string>& positions) {
+  OpenTrace("stdout", false, false);
+  m_isListing = true;
+  std::string told;
+  HoldTrace(&told);
+  const bool isDone = LoadArguments(2) && FollowPositions(m_settings, follow, positions);
+  HoldTrace(nullptr);
+  if (!isDone) WriteHeldToTrace(told);
+  CloseTrace();
+  return isDone ? 0 : 1;
+}
+
 namespace {
+
+// Apart from the other arguments, which are those of a run.
+int RunWhere(const std::vector<std::string>& arguments, Follow follow) {
+  constexpr size_t kConfiguration = 2;
+  std::vector<std::string> positions, others;
+  for (size_t i = 0; i < arguments.size(); ++i) {
+    (i > kConfiguration && IsPosition(arguments[i]) ? positions : others).push_back(arguments[i]);
+  }
+  return CommandLine(others).RunFollow(follow, positions);
+}
 
 // The arguments behind --init: a name, and perhaps a folder.
 int RunInit(const std::vector<std::string>& arguments) {
@@ -190,6 +212,8 @@ int CommandLine::Dispatch() {
   const std::string_view first = m_arguments.size() > 1 ? m_arguments[1] : std::string_view();
   if (first == "--init") return RunInit(m_arguments);
   if (first == "--list") return RunList();
+  if (first == "--where") return RunWhere(m_arguments, Follow::Back);
+  if (first == "--there") return RunWhere(m_arguments, Follow::Forth);
   if (first == "--help") {
     WriteToConsole(HelpText());
     return 0;

@@ -6,6 +6,7 @@
 #include <utility>
 #include <vector>
 
+#include "driver/where.h"
 #include "workspace/config_settings.h"
 
 namespace qrex {
@@ -15,6 +16,8 @@ class CommandLine {
   explicit CommandLine(std::vector<std::string> arguments)
       : m_arguments(std::move(arguments)) {}  // the program's path first
   int Run();                                  // the exit status
+  // The same where positions are to be followed, which the arguments are without.
+  int RunFollow(Follow follow, const std::vector<std::string>& positions);
 
  private:
   int Dispatch();

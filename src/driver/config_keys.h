@@ -55,6 +55,8 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
      "make again what has changed in any way: keys, switches, older files"},
     {"commandFiles", &ConfigSettings::commandFiles,
      "compilers read their options in response files, else on command lines"},
+    {"compileCommands", &ConfigSettings::compileCommands,
+     "write compile_commands.json, for clangd, clang-tidy and others"},
 };
 
 inline constexpr ConfigKey<int64_t ConfigSettings::*> kNumberKeys[] = {

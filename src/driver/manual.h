@@ -22,6 +22,11 @@ inline constexpr CallForm kCallForms[] = {
     {"--init", "NAME [FOLDER]", "lays out a workspace that builds and runs, in the folder NAME; overwrites nothing"},
     {"--list", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...]",
      "tells what a run would read and translate, for scripts: docs/cmake.md has the form"},
+    {"--where", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...] [FILE:LINE[:COLUMN] ...]",
+     "follows positions in generated text back to the sources, where a line goes on with \" (stale)\" if they have\n"
+     "changed since; without any it does so in the lines of standard input: clang-tidy ... | Qrex --where zoo.qrex"},
+    {"--there", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...] [FILE:LINE[:COLUMN] ...]",
+     "the other way: to the first generated line that comes of one of a source"},
     {"--help", "", "this text"},
     {"--version", "", "the release"},
 };

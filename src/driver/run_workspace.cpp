@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "driver/compile_commands.h"
 #include "driver/depfile.h"
 #include "driver/listing.h"
 #include "driver/observers.h"
@@ -31,12 +32,15 @@ namespace {
 
 constexpr char kMarkerFile[] = ".qrwsroot";
 
+enum class LoadedTo { Run, Ask };  // a question writes nothing
+
 class WorkspaceRun {
  public:
-  explicit WorkspaceRun(ConfigSettings& settings) : m_settings(settings), m_workspace(settings) {}
+  explicit WorkspaceRun(ConfigSettings& settings, LoadedTo purpose = LoadedTo::Run)
+      : m_settings(settings), m_purpose(purpose), m_workspace(settings) {}
   bool LoadAll();
   bool Run(ScopeTimer& timer);
-  const Workspace& Loaded() const { return m_workspace; }
+  Workspace& Loaded() { return m_workspace; }
   bool IsCompleted() const { return m_isCompleted; }  // else an error has ended it early
 
  private:
@@ -58,6 +62,7 @@ class WorkspaceRun {
   ProjectConfig* FindProjectConfig(const Project& project) const;
 
   ConfigSettings& m_settings;
+  const LoadedTo m_purpose;
   Workspace m_workspace;
   Generator m_generator{m_settings.leftovers};
   ProjectQueue m_queue{m_settings};
@@ -113,7 +118,9 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
                         .WithHint(TriedInTree(m_settings, entry)));
     return false;
   }
-  CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
+  if (m_purpose == LoadedTo::Run) {
+    CopyIfNewer(m_settings.leftovers, fullPath, m_settings.exportUntranslatedInclude + "/" + entry, true);
+  }
   const size_t slash = entry.rfind('/');
   m_workspace.relativeDir = slash == std::string::npos ? std::string() : entry.substr(0, slash);
   WorkspaceParser parser(m_workspace, fullPath);
@@ -448,15 +455,35 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (loaded) *loaded = run;
   RunObservers observers(settings);
   observers.Expect(run->Loaded());
-  const bool succeeded = run->LoadAll() && run->Run(timer);
+  const bool succeeded = run->LoadAll() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
   return observers.End(run->IsCompleted()) && succeeded;
 }
 
 bool ListWorkspace(ConfigSettings& settings, std::string& list) {
   if (!CheckPathSyntax(settings)) return false;
-  WorkspaceRun run(settings);
+  WorkspaceRun run(settings, LoadedTo::Ask);
   if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
   list = ListingOf(run.Loaded());
+  return true;
+}
+
+bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings, LoadedTo::Ask);
+  if (!run.LoadAll()) return false;
+  PositionFilter filter(run.Loaded(), follow);
+  if (positions.empty()) filter.Run();
+  std::string text;
+  for (const std::string& position : positions) {
+    const auto followed = filter.Rewritten(position);
+    if (!followed) {
+      TraceWriter() << "Error: " << position << " is no position in a "
+                    << (follow == Follow::Back ? "file that was translated" : "source that is translated") << "\n";
+      return false;
+    }
+    text += *followed + "\n";
+  }
+  WriteToConsole(text);
   return true;
 }
 

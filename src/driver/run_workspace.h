@@ -3,7 +3,9 @@
 
 #include <memory>
 #include <string>
+#include <vector>
 
+#include "driver/where.h"
 #include "workspace/config_settings.h"
 
 namespace qrex {
@@ -17,6 +19,10 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded = null
 // Loads the same, and tells of it in the form of driver/listing.h. False, with a message, where something cannot be
 // loaded.
 bool ListWorkspace(ConfigSettings& settings, std::string& list);
+
+// Loads the same, and follows these positions, or those in the lines of standard input where there are none. False,
+// with a message, where something cannot be loaded or a position is none that is known.
+bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions);
 
 // The deepest directory of the path that holds the marker, and the path relative to it.
 bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative);

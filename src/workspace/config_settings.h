@@ -69,6 +69,7 @@ struct ConfigSettings {
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
   std::string depfile;                // to be written behind a run; empty: none
+  bool compileCommands = false;       // compile_commands.json is written ahead of it
   RunMode fileMode = RunMode::Build;  // without what the command line added
   std::map<std::string, PlatformEnvironment> platformEnvironments;
   // Whoever may read the settings may write files and run tools.

@@ -1,0 +1,143 @@
+#!/usr/bin/env python3
+"""compile_commands.json, as other tools read it: what stands there compiles each file, and clangd and clang-tidy take it."""
+
+import json
+import shutil
+import subprocess
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+
+ROOT = Path(__file__).resolve().parents[2]
+EXAMPLES = {"cmake": "stock", "evolution": "evolution", "first": "first", "remote": "remote", "shapes": "geometry", "tour": "tour"}
+NAME = "compile_commands.json"
+HEAD = '$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n'
+FILES = {
+    "all.qrex": SETTINGS + "compileCommands = true\ntranslateOnly = true\n",
+    "tree/.qrwsroot": "",
+    "tree/all.qrws": '"all" { "app" "plain" }\n',
+    "tree/app/src/app.qrpj": HEAD % "app" + 'qrex\n+cpp ("gcc") { -DVALUE=2 }\n'
+                                    '{ "src" { "app.cpp" "two words.cpp" "c.c" "a.asm" "h.h" } }\n',
+    "tree/app/src/app.cpp": "int value = VALUE;\nint main() { return 0; }\n",
+    "tree/app/src/two words.cpp": "int two;\n",
+    "tree/app/src/c.c": "int c;\n",
+    "tree/app/src/a.asm": "end\n",
+    "tree/app/src/h.h": "int h();\n",
+    "tree/plain/src/plain.qrpj": HEAD % "plain" + '{ "src" { "plain.cpp" } }\n',
+    "tree/plain/src/plain.cpp": "int main() { return 0; }\n",
+}
+
+
+def entries(workspace):
+    return json.loads(workspace.path(NAME).read_text())
+
+
+def compile_all(workspace):
+    """Each entry as it stands, without a shell between."""
+    for entry in entries(workspace):
+        output = workspace.path(entry["output"])
+        output.parent.mkdir(parents=True, exist_ok=True)
+        done = subprocess.run(entry["arguments"], cwd=entry["directory"], capture_output=True, text=True)
+        assert done.returncode == 0, f"{entry}:\n{done.stderr}"
+        assert output.exists(), entry
+        output.unlink()
+
+
+def newest(name, versions):
+    found = next((f"{name}-{version}" for version in versions if shutil.which(f"{name}-{version}")), None)
+    if not found:
+        raise Skipped(f"{name}-{versions[0]}")
+    return found
+
+
+@in_workspace(FILES, "gcc")
+def files(workspace):
+    """Those of all projects that are compiled, whether translated or not, in all modes alike."""
+    workspace.run("all.qrex")
+    first = workspace.path(NAME).read_text()
+    equal([entry["file"] for entry in entries(workspace)],
+          [f"qrexsource/x64/Debug/app/src/{name}" for name in ("c.c", "two words.cpp", "app.cpp")] + ["tree/plain/src/plain.cpp"])
+    equal({entry["directory"] for entry in entries(workspace)}, {str(workspace.folder.resolve())})
+    compile_all(workspace)
+    before = workspace.times(NAME)
+    for mode in ("build", "gen", "compile"):
+        workspace.run("all.qrex", f"mode={mode}", '$COMPILE_FILE_PATH = "tree/app/src/app.cpp"')
+    equal(workspace.changed(before, NAME), [])  # the same, and left alone
+    workspace.run("all.qrex", 'launcher = "ccache"', "commandFiles=false")
+    equal(workspace.path(NAME).read_text(), first)  # neither is part of it
+    workspace.replace("tree/app/src/app.qrpj", "VALUE=2", "VALUE=2 -DOTHER=1")
+    workspace.run("all.qrex", "mode=gen")
+    holds(workspace.path(NAME).read_text(), '"-DOTHER=1"')
+
+
+@in_workspace(FILES)
+def only_where_asked(workspace):
+    for line in ("compileCommands=false", "mode=clean"):
+        workspace.run("all.qrex", line)
+        assert not workspace.path(NAME).exists(), line
+    workspace.write("tree/app/src/app.cpp", "$class {\n")
+    workspace.run("all.qrex", status=1)
+    equal(len(entries(workspace)), 4)  # an editor needs it most where a source has an error
+    workspace.path(NAME).unlink()
+    workspace.path(NAME).mkdir()
+    holds(workspace.run("all.qrex", status=1), "Error: ", NAME)
+
+
+@in_workspace(FILES)
+def visual(workspace):
+    """Words of cl, which clang takes by that name."""
+    workspace.run("all.qrex", "compiler=vc14", "mode=gen")
+    entry = entries(workspace)[2]
+    equal(entry["arguments"][:2], ["cl", "/c"])
+    holds(" ".join(entry["arguments"]), "/I qrexsource/x64/Debug/app", "/Fo", entry["file"])
+    equal(entry["output"], "x64/Debug/app/app.obj")
+    assert not [word for word in entry["arguments"] if word.startswith(("/Yu", "/Yc", "/Fp"))], entry
+    workspace.run("all.qrex", "compiler=vc14")
+    tidy = newest("clang-tidy", (19, 14))
+    lacks(workspace.shell(f"{tidy} --checks='-*,misc-*' '{entry['file']}' -extra-arg=/DVALUE=2 2>&1"), "error")
+
+
+def in_examples(check):
+    """Calls it with a workspace of each example that is translated, and its files; the runtime's are among them once."""
+    def test(binary):
+        for folder, name in EXAMPLES.items():
+            with Workspace(binary, {}) as workspace:
+                shutil.copytree(ROOT / "examples" / folder, workspace.path("w/e"))
+                workspace.folder = workspace.path("w/e")
+                text = workspace.path(f"{name}.qrex").read_text()
+                workspace.write(f"{name}.qrex", text.replace("../../runtime", str(ROOT / "runtime")))
+                workspace.run(f"{name}.qrex", "translateOnly=true", "compileCommands=true", "mode=build")
+                own = [entry["file"] for entry in entries(workspace) if folder == "tour" or "/Vesk/" not in entry["file"]]
+                assert own, folder
+                check(workspace, own)
+    test.__name__ = check.__name__
+    return test
+
+
+@in_examples
+def examples_compile(workspace, own):
+    words = {entry["file"]: entry["arguments"] for entry in entries(workspace)}
+    for file in own:
+        workspace.path(words[file][words[file].index("-o") + 1]).parent.mkdir(parents=True, exist_ok=True)
+        done = subprocess.run([*words[file], "-fsyntax-only"], cwd=workspace.folder, capture_output=True, text=True)
+        assert done.returncode == 0, f"{file}:\n{done.stderr}"
+
+
+@in_examples
+def clang_tidy(workspace, own):
+    tidy = newest("clang-tidy", (19, 14))
+    for file in own:
+        told = workspace.shell(f"{tidy} --checks='-*,bugprone-use-after-move' '{file}' 2>&1")
+        lacks(told, "error:")
+
+
+@in_examples
+def clangd(workspace, own):
+    server = newest("clangd", (19,))
+    for file in own:
+        holds(workspace.shell(f"{server} --check='{file}' --check-locations=0 2>&1"), "compile_commands.json", "completed, 0 errors")
+
+
+run_tests([files, only_where_asked, visual, examples_compile, clang_tidy, clangd])

@@ -1,0 +1,166 @@
+#!/usr/bin/env python3
+"""Positions followed between generated text and its sources: by arguments, and as a filter behind other tools."""
+
+import shutil
+import subprocess
+import sys
+import time
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, run_tests  # noqa: E402
+
+OUT = "qrexsource/x64/Debug/app/src/"
+FILES = {
+    "all.qrex": SETTINGS + "translateOnly = true\n",
+    "tree/.qrwsroot": "",
+    "tree/app/.keep": "",
+    "tree/all.qrws": '"all" { "app" }\n',
+    "tree/app/src/app.qrpj": '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "app"\nqrex\nconfig { "Debug|x64" }\n'
+                             '{ "open.h" "src" { "a.h" "app.cpp" "x (1).h" } }\n',
+    "tree/app/open.h": "int open_to_all;\n",
+    "tree/app/src/x (1).h": "int x;\nint y;\n",
+    "tree/app/src/a.h": "// first\n\n$enum Kind\n{\n  one,\n  two\n};\ninline int twice_as(int unused)\n{\n    return 2;\n}\n",
+    "tree/app/src/app.cpp": '@import "a.h"\n\nint main()\n{\n  int local = 1;\n  return 0;\n}\n',
+}
+
+
+def lines_of(workspace, name):
+    return workspace.path(name).read_text().splitlines()
+
+
+def line_with(workspace, name, text):
+    return next(number for number, line in enumerate(lines_of(workspace, name), 1) if text in line)
+
+
+def followed(workspace, option, *positions, **options):
+    return workspace.run(option, "all.qrex", *positions, **options).splitlines()
+
+
+def filtered(workspace, text, option="--where"):
+    done = subprocess.run([workspace.binary, option, "all.qrex"], cwd=workspace.folder, input=text, capture_output=True, timeout=100)
+    equal(done.returncode, 0)
+    return done.stdout
+
+
+@in_workspace(FILES)
+def there_and_back(workspace):
+    """Each line of a source that is copied comes back; what a declaration gives leads to it."""
+    workspace.run("all.qrex")
+    before = workspace.times("**/*")
+    for name in ("a.h", "app.cpp", "x (1).h"):
+        source, output = f"tree/app/src/{name}", OUT + name
+        generated = lines_of(workspace, output)
+        copied = [n for n, line in enumerate(lines_of(workspace, source), 1)
+                  if line and generated.count(line) == 1]
+        assert copied, name
+        there = followed(workspace, "--there", *(f"{source}:{n}:{1}" for n in copied))
+        equal(there, [f"{output}:{generated.index(lines_of(workspace, source)[n - 1]) + 1}:1" for n in copied])
+        equal(followed(workspace, "--where", *there), [f"{source}:{n}:1" for n in copied])
+    enum = line_with(workspace, OUT + "a.h", "enum ")
+    place = followed(workspace, "--where", f"{OUT}a.h:{enum}")[0]
+    assert place in {f"tree/app/src/a.h:{n}" for n in range(3, 8)}, place
+    equal(followed(workspace, "--where", f"{OUT}a.h:1"), ["tree/app/src/a.h:1"])  # the guard
+    equal(workspace.times("**/*"), before)  # nothing is written
+
+
+@in_workspace(FILES)
+def questions_write_nothing(workspace):
+    before = workspace.times("**/*")
+    filtered(workspace, f"{OUT}app.cpp:3\n".encode())
+    workspace.run("--there", "all.qrex", "tree/app/src/app.cpp:3")
+    workspace.run("--list", "all.qrex")
+    equal(workspace.times("**/*"), before)
+
+
+@in_workspace(FILES)
+def columns(workspace):
+    """They stay with their word; an indentation that came on the way is taken off."""
+    workspace.run("all.qrex")
+    at = line_with(workspace, OUT + "app.cpp", "local")
+    column = lines_of(workspace, OUT + "app.cpp")[at - 1].index("local") + 1
+    equal(followed(workspace, "--where", f"{OUT}app.cpp:{at}:{column + 2}"), ["tree/app/src/app.cpp:5:9"])
+    at = line_with(workspace, OUT + "app.cpp", "#include")
+    column = lines_of(workspace, OUT + "app.cpp")[at - 1].index("a.h") + 1
+    equal(followed(workspace, "--where", f"{OUT}app.cpp:{at}:{column}")[0].rsplit(":", 1)[0], "tree/app/src/app.cpp:1")
+
+
+@in_workspace(FILES)
+def filter_forms(workspace):
+    """All forms of positions, several in a line; whatever else stands there comes out byte for byte."""
+    workspace.run("all.qrex")
+    folder = str(workspace.folder.resolve())
+    at = line_with(workspace, OUT + "app.cpp", "local")
+    there, back = f"{OUT}app.cpp", "tree/app/src/app.cpp"
+    x = line_with(workspace, OUT + "x (1).h", "int y")
+    for line, expected in [
+            (f"{there}:{at}:3: warning: unused", f"{back}:5:3: warning: unused"),
+            (f"{there}({at}) : error C1: x", f"{back}(5) : error C1: x"),
+            (f"{there}({at},3): x", f"{back}(5,3): x"),
+            (f"In file included from ./{there}:{at}, from {folder}/{there}:{at}:", f"In file included from {back}:5, from {folder}/{back}:5:"),
+            (f"\x1b[1m{there}:{at}:3:\x1b[0m", f"\x1b[1m{back}:5:3:\x1b[0m"),
+            (f"at {OUT}../src/app.cpp:{at}", f"at {back}:5"),
+            (f"<{OUT}x (1).h:{x}>", "<tree/app/src/x (1).h:2>"),
+            ("out/include/app/open.h:5:5: x", "tree/app/open.h:1:5: x"),
+            (f"{there}:{at}:3: x\r", f"{back}:5:3: x\r"),
+            *((same, same) for same in [
+                f"/elsewhere/{there}:{at}:3:", f"my{there}:{at}", f"{there}:99999", f"{there}:0", f"{there}", f"{there}:", f"{there}:x",
+                f"{there}:99999999999999999999999", f"{OUT}none.h:3", "qrexsource/x64/Debug/", f"{there}({at}", "a:1:2: b", "",
+                f"{OUT}../../../../../../../../etc/passwd:1"])]:
+        equal(filtered(workspace, line.encode()), expected.encode())
+        equal(filtered(workspace, (line + "\n").encode() * 2), (expected + "\n").encode() * 2)
+    junk = bytes(range(256)) * 1000 + b"qrexsource/x64/Debug/app/src/\xff\xfe:1:(" * 1000
+    equal(filtered(workspace, junk), junk)
+    equal(filtered(workspace, f"{back}:5:3: x\nother/{back}:5\n".encode(), "--there"), f"{there}:{at}:3: x\nother/{back}:5\n".encode())
+
+
+@in_workspace(FILES)
+def stale(workspace):
+    """A text is told to be older than its source, or than what that imports; what was not translated, as well."""
+    workspace.run("all.qrex")
+    at = line_with(workspace, OUT + "app.cpp", "local")
+    equal(followed(workspace, "--where", f"{OUT}app.cpp:{at}"), ["tree/app/src/app.cpp:5"])
+    time.sleep(0.02)
+    workspace.append("tree/app/src/a.h", "// later\n")
+    equal(followed(workspace, "--where", f"{OUT}app.cpp:{at}", f"{OUT}x (1).h:5"), ["tree/app/src/app.cpp:5 (stale)", "tree/app/src/x (1).h:1"])
+    equal(filtered(workspace, f"{OUT}app.cpp:{at}: x\r\n".encode()), b"tree/app/src/app.cpp:5: x (stale)\r\n")
+    equal(followed(workspace, "--there", "tree/app/src/app.cpp:5"), [f"{OUT}app.cpp:{at} (stale)"])
+    workspace.run("all.qrex")
+    equal(followed(workspace, "--where", f"{OUT}app.cpp:{at}"), ["tree/app/src/app.cpp:5"])
+
+
+@in_workspace(FILES)
+def errors(workspace):
+    workspace.run("all.qrex")
+    holds(workspace.run("--where", "all.qrex", "tree/app/src/app.cpp:3", status=1), "Error: tree/app/src/app.cpp:3 is no position in")
+    holds(workspace.run("--there", "all.qrex", "none.h:3", status=1), "Error: none.h:3 is no position in a source")
+    holds(workspace.run("--where", "none.qrex", "a.h:3", status=1), "none.qrex")
+    workspace.write("tree/app/src/app.cpp", "$class {\n")
+    holds(workspace.run("--where", "all.qrex", f"{OUT}app.cpp:3", status=1), "tree/app/src/app.cpp(1) : error")
+    equal(filtered(workspace, f"{OUT}app.cpp:3\n{OUT}x (1).h:5\n".encode()).decode(), f"{OUT}app.cpp:3\ntree/app/src/x (1).h:1\n")
+
+
+@in_workspace(FILES)
+def speed(workspace):
+    workspace.run("all.qrex")
+    text = (f"{OUT}app.cpp:5:3: warning: a variable is not used [-Wunused]\n" + "  a line of no position\n").encode() * 200_000
+    began = time.monotonic()
+    filtered(workspace, text)
+    assert time.monotonic() - began < 4, "less than 100,000 lines a second"
+
+
+@in_workspace({**FILES, "tree/app/src/a.h": "// first\n\ninline int twice_as(int unused)\n{\n  return 2;\n}\n",
+               "tree/app/src/app.cpp": '@import "a.h"\nint main()\n{\n  return twice_as(1);\n}\n'}, "clang-tidy", "g++", "gdb")
+def real_tools(workspace):
+    """What clang-tidy and gdb say of generated text, by pipe."""
+    workspace.run("all.qrex", "compileCommands=true")
+    told = workspace.shell(f"clang-tidy --checks='-*,misc-unused-parameters' --header-filter='.*' {OUT}app.cpp 2>&1 | Qrex --where all.qrex")
+    source = lines_of(workspace, "tree/app/src/a.h")
+    line = next(n for n, text in enumerate(source, 1) if "unused" in text)
+    holds(told, f"{workspace.folder.resolve()}/tree/app/src/a.h:{line}:{source[line - 1].index('unused') + 1}: warning:")
+    workspace.shell(f"g++ -g -O0 -Iqrexsource/x64/Debug/app/src -Iqrexsource/x64/Debug -o prog {OUT}app.cpp")
+    told = workspace.shell("gdb -batch -nx -ex 'break twice_as' -ex run -ex bt prog 2>&1 | Qrex --where all.qrex")
+    holds(told, "twice_as (unused=1) at tree/app/src/a.h:5", "main () at tree/app/src/app.cpp:4")
+
+
+run_tests([there_and_back, questions_write_nothing, columns, filter_forms, stale, errors, speed, real_tools])
