@@ -76,6 +76,27 @@ def as_type(value, type_):
     return value.address.cast(type_.pointer()).dereference()
 
 
+def is_whole(base):
+    """Whether a container of the standard library can be walked: one in memory that was never set may lead in circles."""
+    fields = {field.name for field in base.type.fields()}
+    try:
+        if "_M_t" in fields:
+            header = base["_M_t"]["_M_impl"]["_M_header"]
+            root = header["_M_parent"]
+            return int(root["_M_parent"]) == int(header.address) if int(root) else int(header["_M_left"]) == int(header.address)
+        if base.type.name.startswith(("std::list<", "std::__cxx11::list<")):
+            node = base["_M_impl"]["_M_node"]
+            return int(node["_M_next"]["_M_prev"]) == int(node.address)
+        if base.type.name.startswith("std::vector<") and not base.type.name.startswith("std::vector<bool"):
+            begin, end, room = (int(base["_M_impl"][name]) for name in ("_M_start", "_M_finish", "_M_end_of_storage"))
+            return 0 <= begin <= end <= room < MOST_BYTES
+    except gdb.MemoryError:
+        return False
+    except gdb.error:
+        pass  # another standard library, which prints as it does
+    return True
+
+
 # --- The library's own types
 
 class Inherited:
@@ -88,15 +109,21 @@ class Inherited:
         self._base = value.cast(base)
         self._inner = gdb.default_visualizer(self._base)
         self._name = name
+        self._is_whole = is_whole(self._base)
+        if not self._is_whole:
+            return
         for method in ("children", "display_hint"):
             if hasattr(self._inner, method):
                 setattr(self, method, getattr(self._inner, method))
 
     def to_string(self):
+        if not self._is_whole:
+            return f"{self._name}, not initialised"
         if self._inner is None:
             return self._base.format_string(raw=True)
         text = self._inner.to_string() if hasattr(self._inner, "to_string") else self._name
-        return re.sub(r"^std::(__\w+::)*\w+", self._name, text) if isinstance(text, str) and "string" not in self._name else text
+        is_text = "string" in self._name or not isinstance(text, str)
+        return text if is_text else re.sub(r"^std::(__\w+::)*\w+", self._name, text)
 
 
 class DynArray:
@@ -170,8 +197,9 @@ class NodeMap:
     """The nodes of a `$cache` function with keys."""
 
     def __init__(self, value, _):
-        self._inner = gdb.default_visualizer(value["m_nodes"])
-        self.children = self._inner.children if self._inner else lambda: iter(())
+        nodes = value["m_nodes"]
+        inner = gdb.default_visualizer(nodes) if is_whole(nodes) else None
+        self.children = inner.children if inner else lambda: iter(())
 
     def to_string(self):
         return "cache"
@@ -329,7 +357,7 @@ class Class:
 
     def to_string(self):
         release = release_of(self._type)
-        return None if release is None else f"release {release}"
+        return None if release is None else f"{self._type.name} of release {release}"
 
     def children(self):
         return fields_of(self._value, self._type)
