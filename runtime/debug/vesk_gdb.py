@@ -81,15 +81,20 @@ def is_whole(base):
     fields = {field.name for field in base.type.fields()}
     try:
         if "_M_t" in fields:
-            header = base["_M_t"]["_M_impl"]["_M_header"]
-            root = header["_M_parent"]
-            return int(root["_M_parent"]) == int(header.address) if int(root) else int(header["_M_left"]) == int(header.address)
+            tree = base["_M_t"]["_M_impl"]
+            header = tree["_M_header"]
+            at, count = int(header.address), int(tree["_M_node_count"])
+            root, first, last = (int(header[name]) for name in ("_M_parent", "_M_left", "_M_right"))
+            if count == 0:
+                return (root, first, last) == (0, at, at)
+            return count < MOST_BYTES and at not in (root, first, last) and int(header["_M_parent"]["_M_parent"]) == at
         if base.type.name.startswith(("std::list<", "std::__cxx11::list<")):
             node = base["_M_impl"]["_M_node"]
             return int(node["_M_next"]["_M_prev"]) == int(node.address)
         if base.type.name.startswith("std::vector<") and not base.type.name.startswith("std::vector<bool"):
             begin, end, room = (int(base["_M_impl"][name]) for name in ("_M_start", "_M_finish", "_M_end_of_storage"))
-            return 0 <= begin <= end <= room < MOST_BYTES
+            width = base.type.template_argument(0).sizeof
+            return begin <= end <= room < MOST_BYTES and (end - begin) % width == (room - begin) % width == 0
     except gdb.MemoryError:
         return False
     except gdb.error:
