@@ -131,35 +131,25 @@ class Inherited:
         return text if is_text else re.sub(r"^std::(__\w+::)*\w+", self._name, text)
 
 
-class DynArray:
-    def __init__(self, value, name):
-        self._name = name
-        self._items, self._size = value["m_items"], int(value["m_size"])
-        width = max(1, self._items.type.target().sizeof)
-        self._is_array = 0 <= self._size <= MOST_BYTES // width and (self._size == 0 or int(self._items) != 0)
+class Items:
+    """Array and DynArray."""
 
-    def to_string(self):
-        return f"{self._name} of length {self._size}" if self._is_array else f"{self._name}, not initialised"
-
-    def children(self):
-        for at in range(self._size if self._is_array else 0):
-            yield f"[{at}]", (self._items + at).dereference()
-
-    def display_hint(self):
-        return "array"
-
-
-class Array:
     def __init__(self, value, name):
         self._name = name
         self._items = value["m_items"]
-        self._size = self._items.type.range()[1] + 1
+        if self._items.type.code == gdb.TYPE_CODE_ARRAY:
+            self._size = self._items.type.range()[1] + 1
+            self._is_whole = True
+        else:
+            self._size = int(value["m_size"])
+            most = MOST_BYTES // max(1, self._items.type.target().sizeof)
+            self._is_whole = 0 <= self._size <= most and (self._size == 0 or int(self._items) != 0)
 
     def to_string(self):
-        return f"{self._name} of length {self._size}"
+        return f"{self._name} of length {self._size}" if self._is_whole else f"{self._name}, not initialised"
 
     def children(self):
-        for at in range(self._size):
+        for at in range(self._size if self._is_whole else 0):
             yield f"[{at}]", self._items[at]
 
     def display_hint(self):
@@ -214,7 +204,7 @@ class NodeMap:
 
 
 LIBRARY = {"basic_xstring": Inherited, "xvector": Inherited, "xdeque": Inherited, "xlist": Inherited, "xset": Inherited,
-           "xbag": Inherited, "xmap": Inherited, "Array": Array, "DynArray": DynArray, "ptr": Handle, "pref": Handle,
+           "xbag": Inherited, "xmap": Inherited, "Array": Items, "DynArray": Items, "ptr": Handle, "pref": Handle,
            "cref": Handle, "openvariant": OpenVariant, "DGNodeMap": NodeMap}
 
 

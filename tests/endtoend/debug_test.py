@@ -87,7 +87,8 @@ def the_tour(binary):
 
 # Of each element that the file may have: its attributes, and the elements in it.
 SCHEMA = {"AutoVisualizer": (set(), {"Type"}), "Type": ({"Name"}, {"DisplayString", "Expand"}),
-          "DisplayString": ({"Condition"}, set()), "Expand": (set(), {"ExpandedItem", "ArrayItems"}), "ExpandedItem": ({"Condition"}, set()),
+          "DisplayString": ({"Condition"}, set()), "Expand": (set(), {"ExpandedItem", "ArrayItems"}),
+          "ExpandedItem": ({"Condition"}, set()),
           "ArrayItems": (set(), {"Size", "ValuePointer"}), "Size": (set(), set()), "ValuePointer": (set(), set())}
 SPACE = "{http://schemas.microsoft.com/vstudio/debugger/natvis/2010}"
 
@@ -106,8 +107,8 @@ def members(name):
     """Words in a class and in what it derives from."""
     _, head, body = class_text(name)
     words = set(re.findall(r"\w+", body))
-    for base in re.findall(r"(?:public|private) (\w+)", head):
-        words |= members("DGNode" if base == "Node" else base)  # the parameter of nodes of `$cache` functions
+    for base in re.findall(r"(?:public|private) (?!std::)(\w\w+)", head):  # C is a parameter
+        words |= members("DGNode" if base == "Node" else base)  # and so is this, of nodes of `$cache` functions
     return words
 
 
