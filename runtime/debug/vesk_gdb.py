@@ -94,7 +94,7 @@ def is_whole(base):
         if base.type.name.startswith("std::vector<") and not base.type.name.startswith("std::vector<bool"):
             begin, end, room = (int(base["_M_impl"][name]) for name in ("_M_start", "_M_finish", "_M_end_of_storage"))
             width = base.type.template_argument(0).sizeof
-            return begin <= end <= room < MOST_BYTES and (end - begin) % width == (room - begin) % width == 0
+            return (begin > 0) == (room > 0) and begin <= end <= room < MOST_BYTES and (end - begin) % width == (room - begin) % width == 0
     except gdb.MemoryError:
         return False
     except gdb.error:

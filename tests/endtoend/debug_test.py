@@ -26,6 +26,18 @@ def gdb(workspace, program, *commands, options=f"-x {PRINTERS}"):
     return output
 
 
+# A print that meets memory which cannot be read ends a file of commands, but not a session.
+SHOW = """python
+def show(expression):
+    try:
+        gdb.write(f"tried {expression}: ")
+        gdb.execute(f"output {expression}")
+        gdb.write("\\n")
+    except gdb.MemoryError as error:
+        gdb.write(f"{error}\\n")
+end"""
+
+
 def line_of(workspace, source, text):
     """A place for `break`: the line of generated text that begins with this."""
     name = f"qrexsource/x64/Debug/{source}"
@@ -56,17 +68,18 @@ def the_tour(binary):
         changed, many, shared = (line_of(workspace, "app/src/app.cpp", text) for text in (
             'xout() << order << ", " << order.Summary()', 'show("many")', 'xout() << "    the forecast'))
         output = gdb(
-            workspace, "app",
+            workspace, "app", SHOW,
             # No object is made yet: what stands there is what others left.
-            "break app::ChangeModel", "run >/dev/null", *[f"print {{{type_}}}($sp+{at})" for at in (0, 8, 24) for type_ in (
-                "orders::Order", "app::Shop", "orders::Payment", "orders::Priority", "orders::Address")],
-            "print {vesk::xmap<vesk::basic_xstring<char>,int>}$sp", "print {app::Shop}0",
+            "break app::ChangeModel", "run >/dev/null", *[
+                f"python show('{{{type_}}}{at}')" for at in ("$sp", "($sp+8)", "($sp+24)", "$rip", "0") for type_ in (
+                    "orders::Order", "app::Shop", "orders::Payment", "orders::Priority", "orders::Address",
+                    "vesk::xmap<vesk::basic_xstring<char>,int>")],
             f"break {changed}", "continue", "echo order:\\n", "print order", "print order.extras", "print order._model_.remarks",
             f"break {many}", "continue", "echo many:\\n", "print shop", "print shop.subtotal", "print shop.price",
             f"break {shared}", "continue", "echo shared:\\n", "print shop", "print shop._dn_Forecast",
             "break orders::Describe(int)", "continue", "up 2", "echo kinds:\\n", "print payments", "print read[1]", "up -1",
             "print a")
-        holds(output, "Cannot access memory", "order:\n")
+        holds(output, "tried {app::Shop}$sp: ", "not initialised", "tried {app::Shop}0: Cannot access memory", "order:\n")
         holds(output, "order:\n$", 'orders::Order of release 3 = {customer = "Di", pieces = 0, price = 0, points = 3, '
               'priority = Low, remarks = vesk::xvector of length 1, capacity 2 = {"heavy"}, '
               'extras = vesk::xmap with 1 element = {["wrapping"] = 2}, grades = vesk::Array of length 3 = {0, 4, 0}, '
