@@ -20,6 +20,7 @@ INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/doc/
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex",
              "lib/cmake/Qrex/QrexConfig.cmake"]
 RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h", "lib/qrex/include/Vesk/vxObject/IObject.h",
+           "share/qrex/runtime/debug/vesk_gdb.py", "share/qrex/runtime/debug/vesk.natvis",
            "lib/qrex/runtime/x64/Debug/libvxObject.a", "lib/qrex/runtime/x64/Release/libvxObject.a"]
 
 

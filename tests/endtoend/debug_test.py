@@ -1,0 +1,148 @@
+#!/usr/bin/env python3
+"""What debuggers show of programs: gdb with the printers of the runtime, and the file for the debugger of Visual Studio."""
+
+import re
+import sys
+import xml.etree.ElementTree as XmlTree
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from runtime_fixture import ROOT, TOUR, build  # noqa: E402
+from workspace_fixture import CACHE, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+
+PRINTERS = ROOT / "runtime/debug/vesk_gdb.py"
+NATVIS = ROOT / "runtime/debug/vesk.natvis"
+HEADERS = ROOT / "runtime/Vesk/vxObject"
+BIN = "out/lib/x64/Debug"
+
+
+def gdb(workspace, program, *commands, options=f"-x {PRINTERS}"):
+    """What gdb prints for the commands, from the last that starts the program on. It must come to their end."""
+    settings = ["set pagination off", "set confirm off", "set width 0", "set style enabled off"]
+    workspace.write("commands.gdb", "\n".join([*settings, *commands, "echo came to the end\\n"]) + "\n")
+    output = workspace.shell(f"gdb -nx -q -batch {options} -x commands.gdb {BIN}/{program} </dev/null 2>&1")
+    holds(output, "came to the end")
+    lacks(output, "Python Exception")
+    return output
+
+
+# A print that meets memory which cannot be read ends a file of commands, but not a session.
+SHOW = """python
+def show(expression):
+    try:
+        gdb.write(f"tried {expression}: ")
+        gdb.execute(f"output {expression}")
+        gdb.write("\\n")
+    except gdb.MemoryError as error:
+        gdb.write(f"{error}\\n")
+end"""
+
+
+def line_of(workspace, source, text):
+    """A place for `break`: the line of generated text that begins with this."""
+    name = f"qrexsource/x64/Debug/{source}"
+    lines = workspace.path(name).read_text().splitlines()
+    return f"{Path(source).name}:{next(i for i, line in enumerate(lines, 1) if line.strip().startswith(text))}"
+
+
+def first_workspace(binary):
+    """An enumeration by its label. The program names the printers itself; a debugger that may loads them."""
+    need("g++", "gdb")
+    with Workspace(binary, {}) as workspace:
+        workspace.run("--init", "zoo", ".")
+        workspace.replace("tree/zoo_app/src/zoo_app.cpp", '@import "Vesk/vxObject/IObject.h"\n',
+                          '@import "Vesk/vxObject/IObject.h"\n@import "Vesk/vxObject/DebugScript.h"\n'
+                          f'vxDebugScript("{PRINTERS}")\n')
+        holds(workspace.run("zoo.qrex", f'PATH("x64") = {{ "{CACHE}" "/usr/bin" "/bin" }}'), "\nCompleted.")
+        stop = ["break animals::Animal::FoodPerDay", "run >/dev/null", "up"]
+        there = gdb(workspace, "zoo_app", *stop, "print leo", "print (animals::Diet)7",
+                    options="-iex 'add-auto-load-safe-path /'")
+        holds(there, '$1 = {name = "Leo", diet = Meat, weight = 200}\n', "$2 = 7\n")
+        holds(gdb(workspace, "zoo_app", *stop, "print leo.diet", options="-iex 'set auto-load safe-path /nowhere'"), "m_value = 1")
+
+
+def the_tour(binary):
+    """Values of all kinds, where they are set, stale, and where nothing is yet."""
+    need("g++", "gdb")
+    with build(binary, TOUR / "tree", "tour.qrws") as workspace:
+        changed, many, shared = (line_of(workspace, "app/src/app.cpp", text) for text in (
+            'xout() << order << ", " << order.Summary()', 'show("many")', 'xout() << "    the forecast'))
+        output = gdb(
+            workspace, "app", SHOW,
+            # No object is made yet: what stands there is what others left.
+            "break app::ChangeModel", "run >/dev/null", *[
+                f"python show('{{{type_}}}{at}')" for at in ("$sp", "($sp+8)", "($sp+24)", "$rip", "0") for type_ in (
+                    "orders::Order", "app::Shop", "orders::Payment", "orders::Priority", "orders::Address",
+                    "vesk::xmap<vesk::basic_xstring<char>,int>")],
+            f"break {changed}", "continue", "echo order:\\n", "print order", "print order.extras", "print order._model_.remarks",
+            f"break {many}", "continue", "echo many:\\n", "print shop", "print shop.subtotal", "print shop.price",
+            f"break {shared}", "continue", "echo shared:\\n", "print shop", "print shop._dn_Forecast",
+            "break orders::Describe(int)", "continue", "up 2", "echo kinds:\\n", "print payments", "print read[1]", "up -1",
+            "print a")
+        holds(output, "tried {app::Shop}$sp: ", "not initialised", "tried {app::Shop}0: Cannot access memory", "order:\n")
+        holds(output, "order:\n$", 'orders::Order of release 3 = {customer = "Di", pieces = 0, price = 0, points = 3, '
+              'priority = Low, remarks = vesk::xvector of length 1, capacity 2 = {"heavy"}, '
+              'extras = vesk::xmap with 1 element = {["wrapping"] = 2}, grades = vesk::Array of length 3 = {0, 4, 0}, '
+              'address = orders::Address of release 3 = {street = "", number = 12}, previous = null, counter = 1, '
+              'm_archived = true, m_status = orders::Open}\n',
+              "many:\n", "price = 2, pieces = 40, subtotal = stale, was 8, isLarge = stale, was false, ",
+              'label = stale, was "small", ',
+              "= stale, was 8\n", "= 2\n",
+              "shared:\n", "subtotal = 80, isLarge = true, label = \"large\", ",
+              "Share() = cache = {[{first = 4, second = 2}] = 10, [{first = 5, second = 2}] = 8}, Forecast() = stale, ",
+              "= stale\n",
+              "kinds:\n", "= vesk::xvector of length 4, capacity 4 = {void, card({digits = 4711}), "
+              "purse({coins = vesk::xvector of length 2, capacity 2 = {5, 20}}), transfer(2.5)}\n",
+              "= card({digits = 4711})\n", "= 3\n")
+
+
+# --- The file for Visual Studio
+
+# Of each element that the file may have: its attributes, and the elements in it.
+SCHEMA = {"AutoVisualizer": (set(), {"Type"}), "Type": ({"Name"}, {"DisplayString", "Expand"}),
+          "DisplayString": ({"Condition"}, set()), "Expand": (set(), {"ExpandedItem", "ArrayItems"}),
+          "ExpandedItem": ({"Condition"}, set()),
+          "ArrayItems": (set(), {"Size", "ValuePointer"}), "Size": (set(), set()), "ValuePointer": (set(), set())}
+SPACE = "{http://schemas.microsoft.com/vstudio/debugger/natvis/2010}"
+
+
+def class_text(name):
+    """(head, body) of a class of the runtime."""
+    for header in sorted(HEADERS.glob("*.h")):
+        found = re.search(rf"^(template <[^{{;]*?>\n)?(?:class|struct) {name}\b([^;{{]*)\{{(.*?)^}};", header.read_text(),
+                          re.M | re.S)
+        if found:
+            return found.group(1) or "", found.group(2), found.group(3)
+    raise AssertionError(f"no class {name} in the runtime")
+
+
+def members(name):
+    """Words in a class and in what it derives from."""
+    _, head, body = class_text(name)
+    words = set(re.findall(r"\w+", body))
+    for base in re.findall(r"(?:public|private) (?!std::)(\w\w+)", head):  # C is a parameter
+        words |= members("DGNode" if base == "Node" else base)  # and so is this, of nodes of `$cache` functions
+    return words
+
+
+def natvis(_):
+    """By the schema, and what it names is declared in the runtime's headers, with as many parameters."""
+    root = XmlTree.parse(NATVIS).getroot()
+    equal(root.tag, SPACE + "AutoVisualizer")
+    for element in root.iter():
+        attributes, inner = SCHEMA[element.tag.replace(SPACE, "")]
+        equal((set(element.attrib) - attributes, {child.tag.replace(SPACE, "") for child in element} - inner), (set(), set()))
+        equal(bool((element.text or "").strip()), not inner)
+    equal([type_ for type_ in root if not type_.findall(SPACE + "DisplayString")], [])
+    for type_ in root:
+        name, parameters = re.fullmatch(r"vesk::(\w+)(?:<([*,]+)>)?", type_.get("Name")).groups()
+        template = class_text(name)[0]
+        equal((name, len(re.findall(r"\b(?:typename|ssize_t) \w+", template))), (name, parameters.count("*") if parameters else 0))
+        expressions = " ".join((element.text or "") + " " + element.get("Condition", "") for element in type_.iter())
+        equal((name, set(re.findall(r"\b(?:m_|_)[a-z]\w*", expressions)) - members(name)), (name, set()))
+        for scope, word in re.findall(r"vesk::(\w+)::(\w+)", expressions):
+            headers = "\n".join(header.read_text() for header in HEADERS.glob("*.h"))
+            holds(re.search(rf"enum class {scope}\b[^;]*;", headers).group(), word)
+
+
+run_tests([first_workspace, the_tour, natvis])
