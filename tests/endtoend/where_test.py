@@ -68,7 +68,7 @@ def there_and_back(workspace):
 def questions_write_nothing(workspace):
     before = workspace.times("**/*")
     filtered(workspace, f"{OUT}app.cpp:3\n".encode())
-    workspace.run("--there", "all.qrex", "tree/app/src/app.cpp:3")
+    workspace.run("--there", "all.qrex", "tree/app/src/app.cpp:3", status=1)  # it went nowhere yet
     workspace.run("--list", "all.qrex")
     equal(workspace.times("**/*"), before)
 
