@@ -45,18 +45,60 @@ def line_of(workspace, source, text):
     return f"{Path(source).name}:{next(i for i, line in enumerate(lines, 1) if line.strip().startswith(text))}"
 
 
+HEADER = """@import "Vesk/vxObject/IObject.h"
+namespace more
+{
+$interface+ INamed : vesk::IObject { string8 Name() const; };
+$mixin Counted { $int32 counter; $dep int32 twice = { twice = counter * 2; }; };
+$class+ Cat isa INamed : model { string8 hue; } mixin [ Counted ] { public: vesk::string8 Name() const { return "cat"; } };
+$enum+ class Refined { One = 1, default Two = 20 };
+$variant+ Value { *float64; int32; string8; *{ string8 s; } big; *int32 num; void nothing; };
+}
+"""
+LONG = "a text that has no room in the string itself"
+# Variables, with what gdb prints of them.
+VALUES = [("numbers", "vesk::DynArray<int32> numbers{1, 2}", "vesk::DynArray of length 2 = {1, 2}"),
+          ("five", "vesk::openvariant<int32> five(5)", "int: 5"),
+          ("none", "vesk::openvariant<int32> none", "empty"),
+          ("text", 'vesk::openvariant<int32> text(vesk::string8("hi"))', 'vesk::basic_xstring<char>: "hi"'),
+          ("wide", "vesk::string16 wide(3, u'x')", 'u"xxx"'),
+          ("cat", "more::Cat cat; cat.counter = -1", 'more::Cat of release 2 = {hue = "", counter = -1, twice = stale}'),
+          ("near", "vesk::ptr<more::INamed> near(&cat)", "more::Cat at 0x"),
+          ("nobody", "vesk::ptr<more::INamed> nobody", "null"),
+          ("kept", "vesk::cref<more::Cat> kept(&cat)", "more::Cat at 0x"),
+          ("deque", "vesk::xdeque<int32> deque; deque.push_back(4)", "vesk::xdeque with 1 element = {4}"),
+          ("keys", "vesk::xset<int32> keys; keys.Insert(4)", "vesk::xset with 1 element = {[0] = 4}"),
+          ("on_heap", "more::Value on_heap(2.5)", "2.5"),
+          ("in_place", "more::Value in_place(vesk::int32(7))", "7"),
+          ("longer", f'more::Value longer(vesk::string8("{LONG}"))', f'"{LONG}"'),
+          ("big", 'more::Value big = more::Value::big(vesk::string8("x"))', 'big({s = "x"})'),
+          ("scalar", "more::Value scalar = more::Value::num(3)", "num(3)"),
+          ("nothing", "more::Value nothing = more::Value::nothing()", "nothing"),
+          ("refined", "more::Refined refined(more::Refined::Two)", "Two"),
+          ("two", "vesk::Array<more::Refined, 2> two", "vesk::Array of length 2 = {Two, Two}")]
+
+
 def first_workspace(binary):
-    """An enumeration by its label. The program names the printers itself; a debugger that may loads them."""
+    """An enumeration by its label, and values of other kinds. The program names the printers itself; gdb loads them if it may."""
     need("g++", "gdb")
     with Workspace(binary, {}) as workspace:
         workspace.run("--init", "zoo", ".")
+        workspace.write("tree/zoo_core/api/more.h", HEADER)
+        workspace.write("tree/zoo_core/src/zoo_core.cpp", '@import "zoo_core/api/more.h"\n' +
+                        workspace.path("tree/zoo_core/src/zoo_core.cpp").read_text())
+        workspace.replace("tree/zoo_app/src/zoo_app.cpp", "int main()", "void Stop() {}\nvoid Values()\n{\n" + "".join(
+            f"    {declaration};\n" for _, declaration, _ in VALUES) + "    Stop();\n}\nint main()")
+        workspace.replace("tree/zoo_app/src/zoo_app.cpp", "animals::Animal leo(", "Values();\n    animals::Animal leo(")
         workspace.replace("tree/zoo_app/src/zoo_app.cpp", '@import "Vesk/vxObject/IObject.h"\n',
                           '@import "Vesk/vxObject/IObject.h"\n@import "Vesk/vxObject/DebugScript.h"\n'
+                          '@import "zoo_core/api/more.h"\n'
                           f'vxDebugScript("{PRINTERS}")\n')
         holds(workspace.run("zoo.qrex", f'PATH("x64") = {{ "{CACHE}" "/usr/bin" "/bin" }}'), "\nCompleted.")
         stop = ["break animals::Animal::FoodPerDay", "run >/dev/null", "up"]
-        there = gdb(workspace, "zoo_app", *stop, "print leo", "print (animals::Diet)7",
-                    options="-iex 'add-auto-load-safe-path /'")
+        there = gdb(workspace, "zoo_app", "break Stop", "run >/dev/null", "up", "info locals", "continue", "delete", *stop,
+                    "print leo", "set var leo.diet.m_value = 7", "print leo.diet", options="-iex 'add-auto-load-safe-path /'")
+        for name, _, printed in VALUES:
+            holds(there, f"\n{name} = {printed}")
         holds(there, '$1 = {name = "Leo", diet = Meat, weight = 200}\n', "$2 = 7\n")
         holds(gdb(workspace, "zoo_app", *stop, "print leo.diet", options="-iex 'set auto-load safe-path /nowhere'"), "m_value = 1")
 
