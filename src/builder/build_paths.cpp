@@ -41,6 +41,12 @@ std::string GccTargetPath(const Project& project, const ProjectConfig& config) {
   return project.settings->exportLib + "/" + config.platform + "/" + config.name + "/" + GccTargetName(project);
 }
 
+bool IsTranslated(const Project& project) {
+  return project.usesQrex && !project.hasFaultyFile && (!project.exported || IsLibrary(project.targetType));
+}
+
+bool IsTranslated(const ProjectFile& file) { return !file.project->exported || file.kind == FileKind::H; }
+
 bool HasObject(const ProjectFile& file) {
   return file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::Asm;
 }

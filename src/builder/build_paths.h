@@ -24,6 +24,9 @@ std::string GccTargetName(const Project& project);
 std::string GccTargetPath(const Project& project, const ProjectConfig& config);
 std::string_view GccTargetExtension(TargetType type);  // "a", "so", "???" of a utility project; empty for programs
 
+// Whether a build translates files of the project, and this one of such a project: of one that comes built the headers.
+bool IsTranslated(const Project& project);
+bool IsTranslated(const ProjectFile& file);
 bool HasObject(const ProjectFile& file);  // C, C++ and assembler sources
 
 class BuildPaths {

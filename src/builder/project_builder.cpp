@@ -7,6 +7,7 @@
 #include "builder/make_reason.h"
 #include "builder/reflection_tails.h"
 #include "builder/staleness.h"
+#include "builder/target_command.h"
 #include "builder/tools.h"
 #include "platform/system.h"
 #include "text/files.h"
@@ -278,14 +279,14 @@ std::unique_ptr<BuildStep> ProjectBuilder::ReportUnlinked(const Project& library
 std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
-  const std::vector<std::string> inputs = CollectLinkInputs(*this);
+  const std::vector<std::string> inputs = CollectLinkInputs(project, config);
   const FileStamp targetStamp = StampOf(target);
   const int64_t targetTime = targetStamp.time;
   auto stampOf = [&](const std::string& input) {
     const auto known = m_objects.find(input);
     return known == m_objects.end() ? StampOf(input) : known->second.stamp;
   };
-  std::vector<std::string> watched = LibrariesOfSwitches(*this);
+  std::vector<std::string> watched = LibrariesOfSwitches(project, config);
   watched.insert(watched.end(), inputs.begin(), inputs.end());
   auto isLater = [&](const std::string& input) {
     const int64_t time = stampOf(input).time;
@@ -297,7 +298,8 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   if (m_prints) {
     std::vector<FileStamp> stamps;
     for (const std::string& input : watched) stamps.push_back(stampOf(input));
-    m_linkPrint = m_prints->TargetPrint(LinkText(*this, target, inputs), stamps);
+    const TargetCommand command = TargetCommandOf(project, config, target, inputs);
+    m_linkPrint = m_prints->TargetPrint(command.tool + "\n" + command.text, stamps);
   }
   if (isCurrent && !(m_prints && m_prints->Differs(target, m_linkPrint, targetStamp))) return nullptr;
   if (settings.observer) {

@@ -112,6 +112,15 @@ void CommandLine::RunParallelBuild() {
   timer.Label() << "Parallel build with devenv";
 }
 
+// With paths as they are: whatever is called again is called in this folder.
+void CommandLine::NoteCall(size_t firstArgument, size_t configIndex) {
+  const std::string program = platform::ProgramPath(m_arguments[0]);
+  m_settings.call = {program.empty() ? m_arguments[0] : program};
+  m_settings.call.insert(m_settings.call.end(), Argument(firstArgument), Argument(configIndex));
+  m_settings.call.push_back(m_configPath);
+  m_settings.call.insert(m_settings.call.end(), Argument(configIndex + 1), m_arguments.end());
+}
+
 // The settings, from the arguments beginning with assignments; false, with a message, when they are none.
 bool CommandLine::LoadArguments(size_t firstArgument) {
   const size_t configIndex = ReadAssignments(firstArgument);
@@ -121,6 +130,7 @@ bool CommandLine::LoadArguments(size_t firstArgument) {
   }
   ShowArgument(configIndex);
   ReadConfigurationPath(m_arguments[configIndex]);
+  NoteCall(firstArgument, configIndex);
   std::string extraConfigText;
   for (size_t i = configIndex + 1; i < m_arguments.size(); ++i) {
     ShowArgument(i);

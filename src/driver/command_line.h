@@ -25,6 +25,8 @@ class CommandLine {
   int RunList();
   bool LoadArguments(size_t firstArgument);
   size_t ReadAssignments(size_t index);
+  void NoteCall(size_t firstArgument, size_t configIndex);
+  auto Argument(size_t index) const { return m_arguments.begin() + static_cast<ptrdiff_t>(index); }
   void ShowArgument(size_t index, const std::string& remark = {}) const;
   void ReadConfigurationPath(const std::string& argument);
   void RunParallelBuild();

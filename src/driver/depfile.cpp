@@ -39,12 +39,6 @@ void AddTools(const Project& project, const ProjectConfig& config, PathList& out
 
 }  // namespace
 
-bool IsTranslated(const Project& project) {
-  return project.usesQrex && !project.hasFaultyFile && (!project.exported || IsLibrary(project.targetType));
-}
-
-bool IsTranslated(const ProjectFile& file) { return !file.project->exported || file.kind == FileKind::H; }
-
 std::vector<std::string> InputsOf(const Workspace& workspace) {
   PathList inputs;
   for (const auto& file : workspace.settings.sourceFiles) inputs.Add(file->path);

@@ -18,9 +18,6 @@
 
 namespace qrex {
 
-// Whether a build translates files of the project, and this one of such a project: of one that comes built the headers.
-bool IsTranslated(const Project& project);
-bool IsTranslated(const ProjectFile& file);
 // What the run's mode reads: configuration, workspaces, projects, what these import, and the sources of translated
 // projects. Each once, in the order of reading.
 std::vector<std::string> InputsOf(const Workspace& workspace);

@@ -6,6 +6,7 @@
 #include "generators/common.h"
 #include "generators/geany.h"
 #include "generators/make_files.h"
+#include "generators/ninja_file.h"
 #include "generators/solution.h"
 #include "generators/vc10_project.h"
 #include "generators/vc6_project.h"
@@ -88,6 +89,16 @@ void Generator::WriteWorkspaceMakeFiles(const Workspace& workspace) {
   WriteTopMakeFiles(workspace);
 }
 
+void Generator::WriteNinja(Workspace& workspace) {
+  if (!workspace.settings.ninja || workspace.projects.empty() || workspace.projects.front()->configs.empty()) return;
+  if (const std::string name = NameThatNinjaLacks(workspace); !name.empty()) {
+    if (m_form == Form::Plain)
+      TraceWriter() << "Error : Ninja files can't have the name " << name << " - not written\n";
+    return;
+  }
+  Generate("build.ninja", WriteNinjaFile, workspace);
+}
+
 void Generator::WriteProjectFiles(Project& project, ProjectFormat format) {
   const std::string stem = std::string(NamePrefix(m_form)) + project.name;
   switch (format) {
@@ -102,7 +113,8 @@ void Generator::WriteProjectFiles(Project& project, ProjectFormat format) {
       return WriteProjectMakeFiles(project);
     case ProjectFormat::CodeBlocks:
       return Generate(project.name + ".cbp", WriteCodeBlocksProject, project);
-    case ProjectFormat::Geany:  // has a file for the workspace alone
+    case ProjectFormat::Ninja:
+    case ProjectFormat::Geany:  // have a file for the workspace alone
       return;
   }
 }
@@ -118,6 +130,8 @@ void Generator::WriteWorkspaceFiles(Workspace& workspace, ProjectFormat format) 
     case ProjectFormat::Make:
       if (!workspace.projects.empty()) WriteWorkspaceMakeFiles(workspace);
       return;
+    case ProjectFormat::Ninja:
+      return WriteNinja(workspace);
     case ProjectFormat::CodeBlocks:
       if (workspace.projects.empty()) return;
       m_upToDate.erase(workspace.name + ".workspace");  // composed in each pass, as each tells of missing dependencies

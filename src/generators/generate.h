@@ -30,6 +30,7 @@ class Generator {
   void WriteWorkspaceFiles(Workspace& workspace, ProjectFormat format);
   void WriteProjectMakeFiles(Project& project);
   void WriteWorkspaceMakeFiles(const Workspace& workspace);
+  void WriteNinja(Workspace& workspace);
   void WriteTopMakeFiles(const Workspace& workspace);
 
   LeftoverSweep& m_leftovers;

@@ -14,13 +14,14 @@ enum class CompilerKind { vc6, vc8, vc9, vc10, vc11, vc12, vc14, gcc, winegcc, c
 
 enum class CompilerFamily { VisualCpp, Gcc };
 // Each is written for projects, workspaces or both.
-enum class ProjectFormat { Dsp, Vcproj, Vcxproj, Make, CodeBlocks, Geany };
+enum class ProjectFormat { Dsp, Vcproj, Vcxproj, Make, Ninja, CodeBlocks, Geany };
 
 namespace formats {
 inline constexpr ProjectFormat kVc6[] = {ProjectFormat::Dsp};
 inline constexpr ProjectFormat kVc8[] = {ProjectFormat::Vcproj};
 inline constexpr ProjectFormat kVc10[] = {ProjectFormat::Vcxproj};
-inline constexpr ProjectFormat kGcc[] = {ProjectFormat::Make, ProjectFormat::CodeBlocks, ProjectFormat::Geany};
+inline constexpr ProjectFormat kGcc[] = {ProjectFormat::Make, ProjectFormat::Ninja, ProjectFormat::CodeBlocks,
+                                         ProjectFormat::Geany};
 }  // namespace formats
 
 struct Compiler {

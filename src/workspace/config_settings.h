@@ -68,6 +68,8 @@ struct ConfigSettings {
   std::string report;                           // and that of a page
   RuntimeChoice runtime = RuntimeChoice::None;  // the root that follows those of virtualTree
   RunMode mode = RunMode::Build;
+  std::vector<std::string> call;  // the program and its arguments, for what calls it again
+  bool ninja = false;
   std::string depfile;                // to be written behind a run; empty: none
   bool compileCommands = false;       // compile_commands.json is written ahead of it
   RunMode fileMode = RunMode::Build;  // without what the command line added

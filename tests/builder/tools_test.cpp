@@ -4,6 +4,7 @@
 
 #include "builder/tools.h"
 
+#include "builder/target_command.h"
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/paths.h"
@@ -389,7 +390,7 @@ TEST_F(ToolsTest, VisualLinks) {
   app.configs.front()->generalOptions["WholeProgramOptimization"] = "1";
   Builder(CompilerKind::vc14);
   ASSERT_EQ("lib/x64/Debug/app.dll", builder->paths.Target());
-  ASSERT_TRUE(Link(CollectLinkInputs(*builder)));
+  ASSERT_TRUE(Link(CollectLinkInputs(builder->project, builder->config)));
   ASSERT_EQ(
       "link.exe @x64/Debug/app/linker.rsp\n /DLL /OUT:\"o x64/Debug.dll\" /ltcg \"x64/Debug/app/b.obj\""
       " \"x64/Debug/app/r.res\" \"x64/Debug/app/a.obj\" \"x64/Debug/app/c.obj\" \"x64.lib\" \"lib/x64/Debug/base.lib\""
@@ -407,7 +408,7 @@ TEST_F(ToolsTest, VisualLinks) {
   ASSERT_TRUE(Link({"a.obj", "$(Configuration).obj"}));
   ASSERT_EQ("lib.exe @x64/Debug/app/linker.rsp\n /LTCG:STATUS /LTCG \"a.obj\" \"Debug.obj\"\n", TakeLog());
   app.libraryIsStatic = true;
-  const std::vector<std::string> inputs = CollectLinkInputs(*builder);
+  const std::vector<std::string> inputs = CollectLinkInputs(builder->project, builder->config);
   ASSERT_EQ(3u, inputs.size());
 }
 
@@ -444,15 +445,16 @@ TEST_F(ToolsTest, GccLinks) {
       " \"lib/x64/Debug/libbase.a\" \"v/b.a\" \"-lz\" -Xlinker -rpath -Xlinker '$ORIGIN' -lm \"-Wl,-z now\" "
       "\"v/x64.a\" -LDebug -Wl,-z,$x\n";
   Builder(CompilerKind::gcc);
-  ASSERT_TRUE(Link(CollectLinkInputs(*builder)));
+  ASSERT_TRUE(Link(CollectLinkInputs(builder->project, builder->config)));
   ASSERT_EQ("g++ @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/app\"" + inputs, TakeLog());
-  ASSERT_EQ((std::vector<std::string>{"v/b.a", "-lz", "v/x64.a"}), LibrariesOfSwitches(*builder));
+  ASSERT_EQ((std::vector<std::string>{"v/b.a", "-lz", "v/x64.a"}),
+            LibrariesOfSwitches(builder->project, builder->config));
 
   app.targetType = TargetType::DynamicLinkLibrary;
   for (const auto& [compiler, linker] :
        {std::pair(CompilerKind::clang, "clang++"), {CompilerKind::winegcc, "wineg++"}}) {
     Builder(compiler);
-    Link(CollectLinkInputs(*builder));
+    Link(CollectLinkInputs(builder->project, builder->config));
     ASSERT_EQ(linker + (" @x64/Debug/app/linker.rsp\n-o \"lib/x64/Debug/libapp.so\" -shared"
                         " \"-Wl,-soname,libapp.so\"" +
                         inputs),
@@ -462,7 +464,7 @@ TEST_F(ToolsTest, GccLinks) {
   app.targetType = TargetType::StaticLibrary;
   Builder(CompilerKind::gcc);
   Write("lib/x64/Debug/libapp.a", "old members");
-  Link(CollectLinkInputs(*builder));
+  Link(CollectLinkInputs(builder->project, builder->config));
   ASSERT_EQ("ar rcs lib/x64/Debug/libapp.a @x64/Debug/app/linker.rsp\n \"x64/Debug/app/a.o\"\n", TakeLog());
   ASSERT_FALSE(FileExists("lib/x64/Debug/libapp.a"));
 }
