@@ -52,6 +52,6 @@ set(CPACK_DEBIAN_PACKAGE_DESCRIPTION
 "Qrex stands in front of a C++ tool chain. It translates declarations
  that begin with $ into plain C++ with reflection, serialisation and
  interfaces, runs a macro language of @ directives, writes project files
- for Visual Studio, Code::Blocks, Geany and make, and builds what is
+ for Visual Studio, Code::Blocks, Geany, make and ninja, and builds what is
  stale with the compiler at hand.")
 include(CPack)

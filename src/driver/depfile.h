@@ -18,14 +18,6 @@
 
 namespace qrex {
 
-// What the run's mode reads: configuration, workspaces, projects, what these import, and the sources of translated
-// projects. Each once, in the order of reading.
-std::vector<std::string> InputsOf(const Workspace& workspace);
-// Folders whose entries decide what the projects list. That of the run is not among them: its entries change anyway.
-std::vector<std::string> ListedFolders(const ConfigSettings& settings);
-// What is up to date behind a build. Objects and targets only where the run makes them.
-std::vector<std::string> OutputsOf(const Workspace& workspace);
-
 std::string DepfileName(std::string_view path);
 // Writes what the key names, if anything; `generated`: the files of mode = gen. False, with a message, when it fails.
 bool WriteDepfile(const Workspace& workspace, const std::vector<std::string>& generated);

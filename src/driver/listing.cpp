@@ -5,7 +5,7 @@
 #include <string_view>
 
 #include "builder/build_paths.h"
-#include "driver/depfile.h"
+#include "builder/run_files.h"
 
 namespace qrex {
 

@@ -42,7 +42,7 @@ def every_compiler_reads_the_same_files(workspace):
     workspace.run("--init", "zoo", ".")
     workspace.shell("git init -q . && git add -A" if shutil.which("git") else "true")
     for compiler in COMPILERS:
-        for arguments in (["mode=gen"], ["translateOnly=true"]):
+        for arguments in (["mode=gen", "ninja=true"], ["translateOnly=true"]):
             holds(workspace.run("zoo.qrex", f"compiler={compiler}", *arguments), "Completed.")
         for path in workspace.folder.iterdir():
             if path.suffix in {".vcproj", ".vcxproj", ".filters", ".cbp", ".workspace"}:

@@ -29,8 +29,12 @@ TEST_F(NinjaFileTest, Graph) {
       "{ \"src\" { \"app.cpp\" \"c$: x.c\" \"app.h\" } }\n");
   WriteProject("lib", "Static Library", "{ \"src\" { \"lib.cpp\" } }");
   Generate("app");
-  EXPECT_EQ("qrex = '/opt/the tool/Qrex' 'NAME=\"it'\\''s $$1\"' all.qrex ninja=true\n",
-            From("qrex = ", "\npool").substr(0));
+  EXPECT_EQ("qrex = '/opt/the tool/Qrex' 'NAME=\"it'\\''s $$1\"' all.qrex ninja=true\n", From("qrex = ", "\npool"));
+  EXPECT_EQ(R"(build build.ninja: regenerate | $
+    tree/app/src/app.qrpj tree/lib/src/lib.qrpj
+build tree/app/src/app.qrpj tree/lib/src/lib.qrpj: phony
+)",
+            From("build build.ninja", "\nbuild qrex"));
   EXPECT_EQ(R"(build qrexsource/x64/Debug/.translated: translate
   settings = mode=build translateOnly=true 'config="Debug"' 'platform="x64"'
   depfile_setting = 'depfile="qrexsource/x64/Debug/.translated.d"'
@@ -94,7 +98,7 @@ TEST_F(NinjaFileTest, Names) {
   Generate("Fast");
   std::string phony;
   const std::string text = ReadText("build.ninja");
-  for (size_t at = 0; (at = text.find(": phony", at)) != std::string::npos; ++at) {
+  for (size_t at = text.find("# Fast, "); (at = text.find(": phony", at)) != std::string::npos; ++at) {
     const size_t begin = text.rfind('\n', at) + 1;
     phony += text.substr(begin, text.find('\n', at) + 1 - begin);
   }
