@@ -153,7 +153,8 @@ std::string ManualPage() {
       "Translates C++ sources with declarations that begin with $ and directives that begin with @ into plain C++ "
       "with\n"
       "reflection, serialisation and interfaces, compiles and links what is stale, or writes the project files of\n"
-      "Visual Studio, Code::Blocks, Geany, make and ninja. What it does stands in a configuration, a file whose name ends in\n"
+      "Visual Studio, Code::Blocks, Geany, make and ninja. What it does stands in a configuration, a file whose name "
+      "ends in\n"
       ".BR .qrex .\n";
   for (const CallForm& form : kCallForms) page += RoffRow(Call(form), form.help);
   page += ".SH CONFIGURATION\n";
