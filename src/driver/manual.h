@@ -23,8 +23,9 @@ inline constexpr CallForm kCallForms[] = {
     {"--list", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...]",
      "tells what a run would read and translate, for scripts: docs/cmake.md has the form"},
     {"--where", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...] [FILE:LINE[:COLUMN] ...]",
-     "follows positions in generated text back to the sources, where a line goes on with \" (stale)\" if they have\n"
-     "changed since; without any it does so in the lines of standard input: clang-tidy ... | Qrex --where zoo.qrex"},
+     "follows positions in generated text back to the sources, with \" (stale)\" behind those of\n"
+     "texts that have changed since; without any it does so in what it reads, line by line:\n"
+     "clang-tidy ... | Qrex --where zoo.qrex"},
     {"--there", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...] [FILE:LINE[:COLUMN] ...]",
      "the other way: to the first generated line that comes of one of a source"},
     {"--help", "", "this text"},
