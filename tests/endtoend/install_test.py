@@ -78,7 +78,7 @@ def first_workspace(prefix, work):
     (prefix / "lib/qrex/runtime/Vesk/vxObject/library.inc").write_text("#define VESK_LIBRARY_HEADERS 1\n")
     with open(workspace / "tree/zoo_core/src/zoo_core.cpp", "a") as source:
         source.write("int more;\n")
-    holds(qrex(prefix, workspace, "zoo.qrex"), "These headers were translated for another build of the runtime", " 1 errors")
+    holds(qrex(prefix, workspace, "zoo.qrex"), "These headers were translated for another build of the runtime", " errors")
 
 
 @installed
