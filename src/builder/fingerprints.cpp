@@ -10,7 +10,7 @@ namespace qrex {
 
 namespace {
 
-constexpr uint32_t kMagic = 0x2AEF78F2;
+constexpr uint32_t kMagic = 0x2AEF78F3;
 
 void AppendNumber(std::string& out, uint64_t value) {
   for (int i = 0; i < 8; ++i) out += static_cast<char>(value >> (8 * i));

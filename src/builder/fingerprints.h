@@ -1,7 +1,7 @@
 // What the outputs of a project were made from, for the key `fingerprints`: whatever differs is made again, also where
 // it is older. Beside the dependency file, PROJECT.qrexprint.
 //
-// A checked file (text/files.h) with the magic 0x2AEF78F2. Payload; strings are a compact length and their bytes, all
+// A checked file (text/files.h) with the magic 0x2AEF78F3. Payload; strings are a compact length and their bytes, all
 // numbers have 8 bytes, a stamp is a write time and a size:
 //   the keys and variables that decide on translations, as text; the command of the compilers, as text;
 //   number of files, and for each its path, the stamp of its source, the print and stamp of its translation, those of
