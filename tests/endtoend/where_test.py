@@ -146,7 +146,7 @@ def speed(workspace):
     text = (f"{OUT}app.cpp:5:3: warning: a variable is not used [-Wunused]\n" + "  a line of no position\n").encode() * 200_000
     began = time.monotonic()
     filtered(workspace, text)
-    assert time.monotonic() - began < 4, "less than 100,000 lines a second"
+    assert time.monotonic() - began < 40, "time that grows faster than the text"  # it takes a second
 
 
 @in_workspace({**FILES, "tree/app/src/a.h": "// first\n\ninline int twice_as(int unused)\n{\n  return 2;\n}\n",
