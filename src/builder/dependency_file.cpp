@@ -3,6 +3,7 @@
 #include <algorithm>
 #include <vector>
 
+#include "builder/payload.h"
 #include "text/files.h"
 #include "text/numbers.h"
 
@@ -11,10 +12,6 @@ namespace qrex {
 namespace {
 
 constexpr uint32_t kMagic = 0x2AEF78F1;
-
-void AppendNumber(std::string& out, uint64_t value, size_t bytes) {
-  for (size_t i = 0; i < bytes; ++i) out += static_cast<char>(value >> (8 * i));
-}
 
 void AppendRegistry(std::string& out, const DeclarationRegistry& registry) {
   AppendCompactLength(out, registry.entries.size());
@@ -25,43 +22,14 @@ void AppendRegistry(std::string& out, const DeclarationRegistry& registry) {
   }
 }
 
-// Reads the payload piece by piece; whatever does not fit raises.
-class PayloadReader {
- public:
-  explicit PayloadReader(std::string_view payload) : m_rest(payload) {}
-
-  uint64_t Number(size_t bytes) {
-    if (m_rest.size() < bytes) throw DeserialisationException();
-    uint64_t value = 0;
-    for (size_t i = bytes; i-- > 0;) value = value << 8 | static_cast<unsigned char>(m_rest[i]);
-    m_rest.remove_prefix(bytes);
-    return value;
+void ReadRegistry(PayloadReader& reader, DeclarationRegistry& registry) {
+  registry.entries.clear();
+  registry.dirty = false;
+  for (uint64_t files = reader.Length(); files > 0; --files) {
+    std::vector<std::string>& names = registry.entries[std::string(reader.String())];
+    for (uint64_t count = reader.Length(); count > 0; --count) names.emplace_back(reader.String());
   }
-
-  uint64_t Length() {
-    uint64_t length;
-    if (!ReadCompactLength(m_rest, length)) throw DeserialisationException();
-    return length;
-  }
-
-  std::string_view String() {  // lies in the payload
-    std::string_view text;
-    if (!ReadCompactString(m_rest, text)) throw DeserialisationException();
-    return text;
-  }
-
-  void Registry(DeclarationRegistry& registry) {
-    registry.entries.clear();
-    registry.dirty = false;
-    for (uint64_t files = Length(); files > 0; --files) {
-      std::vector<std::string>& names = registry.entries[std::string(String())];
-      for (uint64_t count = Length(); count > 0; --count) names.emplace_back(String());
-    }
-  }
-
- private:
-  std::string_view m_rest;
-};
+}
 
 ScannedFile* FindScanned(BuildFiles& builder, std::string_view path) {
   const auto known = builder.scannedByPath.find(path);
@@ -128,8 +96,8 @@ bool ParseDependencyPayload(BuildFiles& builder, std::string_view payload) {
     }
     file->hasDeclarations = reader.Number(1) != 0;
   }
-  reader.Registry(builder.registerMap);
-  reader.Registry(builder.unregisterMap);
+  ReadRegistry(reader, builder.registerMap);
+  ReadRegistry(reader, builder.unregisterMap);
   return FitsProject(builder);
 }
 

@@ -2,7 +2,7 @@
 
 #include <algorithm>
 
-#include "text/numbers.h"
+#include "builder/payload.h"
 #include "text/paths.h"
 #include "text/text_writer.h"
 
@@ -12,49 +12,27 @@ namespace {
 
 constexpr uint32_t kMagic = 0x2AEF78F3;
 
-void AppendNumber(std::string& out, uint64_t value) {
-  for (int i = 0; i < 8; ++i) out += static_cast<char>(value >> (8 * i));
-}
+constexpr size_t kBytes = 8;  // of a number
 
 void Append(std::string& out, const FileStamp& stamp) {
-  AppendNumber(out, static_cast<uint64_t>(stamp.time));
-  AppendNumber(out, stamp.size);
+  AppendNumber(out, static_cast<uint64_t>(stamp.time), kBytes);
+  AppendNumber(out, stamp.size, kBytes);
 }
 
 void Append(std::string& out, const OutputPrint& made) {
-  AppendNumber(out, made.print);
+  AppendNumber(out, made.print, kBytes);
   Append(out, made.stamp);
 }
 
-// Reads the payload piece by piece; whatever does not fit raises.
-class PayloadReader {
- public:
-  explicit PayloadReader(std::string_view payload) : m_rest(payload) {}
+FileStamp ReadStamp(PayloadReader& reader) {
+  const uint64_t time = reader.Number(kBytes);
+  return {static_cast<int64_t>(time), reader.Number(kBytes)};
+}
 
-  uint64_t Number() {
-    if (m_rest.size() < 8) throw DeserialisationException();
-    uint64_t value = 0;
-    for (size_t i = 8; i-- > 0;) value = value << 8 | static_cast<unsigned char>(m_rest[i]);
-    m_rest.remove_prefix(8);
-    return value;
-  }
-  FileStamp Stamp() {
-    const uint64_t time = Number();
-    return {static_cast<int64_t>(time), Number()};
-  }
-  OutputPrint Print() {
-    const uint64_t print = Number();
-    return {print, Stamp()};
-  }
-  std::string_view String() {
-    std::string_view text;
-    if (!ReadCompactString(m_rest, text)) throw DeserialisationException();
-    return text;
-  }
-
- private:
-  std::string_view m_rest;
-};
+OutputPrint ReadPrint(PayloadReader& reader) {
+  const uint64_t print = reader.Number(kBytes);
+  return {print, ReadStamp(reader)};
+}
 
 }  // namespace
 
@@ -76,17 +54,17 @@ void Fingerprints::Load(BuildFiles& builder, const std::string& path) {
     PayloadReader reader(payload);
     m_keys = reader.String();
     m_command = reader.String();
-    for (uint64_t count = reader.Number(); count > 0; --count) {
+    for (uint64_t count = reader.Number(kBytes); count > 0; --count) {
       const auto file = builder.scannedByPath.find(reader.String());
       File known;
-      known.source = reader.Stamp();
-      known.translation = reader.Print();
-      known.object = reader.Print();
+      known.source = ReadStamp(reader);
+      known.translation = ReadPrint(reader);
+      known.object = ReadPrint(reader);
       if (file != builder.scannedByPath.end()) At(*file->second) = known;
     }
-    for (uint64_t count = reader.Number(); count > 0; --count) {
+    for (uint64_t count = reader.Number(kBytes); count > 0; --count) {
       std::string output(reader.String());
-      m_others[std::move(output)] = reader.Print();
+      m_others[std::move(output)] = ReadPrint(reader);
     }
   } catch (const DeserialisationException&) {
     m_files.clear();
@@ -101,7 +79,7 @@ void Fingerprints::Save(BuildFiles& builder, const std::string& path) {
   std::string payload;
   AppendCompactString(payload, m_keys);
   AppendCompactString(payload, m_command);
-  AppendNumber(payload, files.size());
+  AppendNumber(payload, files.size(), kBytes);
   for (const ScannedFile* file : files) {
     const File& known = Of(*file);
     AppendCompactString(payload, file->file.path);
@@ -109,7 +87,7 @@ void Fingerprints::Save(BuildFiles& builder, const std::string& path) {
     Append(payload, known.translation);
     Append(payload, known.object);
   }
-  AppendNumber(payload, m_others.size());
+  AppendNumber(payload, m_others.size(), kBytes);
   for (const auto& [output, made] : m_others) {
     AppendCompactString(payload, output);
     Append(payload, made);
