@@ -139,7 +139,7 @@ void InsertHooked(T* object, Path const& path, E& field, ssize_t at, V const* so
 }
 template <typename T, typename E, typename V>
 void genop_CreateIntoVector(T* object, Path const& path, E& field, ssize_t at, V const* source, ssize_t count) {
-  if (ModelHook::Any()) return InsertHooked(object, path, field, at, source, count);
+  if (ModelHook::Any()) return InsertHooked(object, Path(path), field, at, source, count);
   PathSource::OnWrite(object, path);
   field.insert(field.begin() + at, source, source + count);
 }

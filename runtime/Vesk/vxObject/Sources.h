@@ -35,8 +35,9 @@ class PathSource {
   static void OnRead(void const* object, Path const& path) {
     if (IsInputWanted()) Read(object, path);
   }
+  // A copy is handed on, so that the path itself need not be made in memory where nobody has read the object.
   static void OnWrite(void const* object, Path const& path) {
-    if (object != s_unread) Write(object, path);
+    if (object != s_unread) Write(object, Path(path));
   }
 
  private:

