@@ -1,6 +1,7 @@
 #include "platform/interpreter.h"
 
 #include <algorithm>
+#include <iterator>
 #include <string_view>
 
 #include "platform/file_system.h"
@@ -36,19 +37,22 @@ bool IsPlainInShell(char c) {
          std::string_view("_@%+=:,./-").find(c) != std::string_view::npos;
 }
 
+bool IsBlank(char c) { return c == ' ' || c == '\t' || c == '\n' || c == '\r'; }
+bool IsRedirection(std::string_view line) { return line.starts_with("1>") || line.starts_with("2>"); }
+
 // The line for the shell, in which more characters have a meaning than in the interpreter that it was written for.
 std::string ForShell(std::string_view line) {
   std::string text;
   bool isQuoted = false, isWordStart = true;
   for (; !line.empty(); line.remove_prefix(1)) {
     const char c = line.front();
-    if (!isQuoted && isWordStart && (line.starts_with("1>") || line.starts_with("2>"))) {
+    if (!isQuoted && isWordStart && IsRedirection(line)) {
       const size_t length = line.starts_with("2>&1") ? 4 : 2;
       text += line.substr(0, length);
       line.remove_prefix(length - 1);
       continue;
     }
-    isWordStart = !isQuoted && (c == ' ' || c == '\t' || c == '\n' || c == '\r');
+    isWordStart = !isQuoted && IsBlank(c);
     if (line.starts_with("\\\"")) {  // a tool's own way to write a quote
       text += line.substr(0, 2);
       line.remove_prefix(1);
@@ -67,9 +71,27 @@ std::string ForShell(std::string_view line) {
   return text;
 }
 
+// Names that mean something else to a shell than the program on PATH.
+bool IsOfShell(std::string_view word) {
+  static constexpr std::string_view kNames[] = {
+      ".",       ":",        "[",       "alias", "bg",     "break", "builtin", "case",     "cd",     "chdir",
+      "command", "continue", "do",      "done",  "echo",   "elif",  "else",    "esac",     "eval",   "exec",
+      "exit",    "export",   "false",   "fc",    "fg",     "fi",    "for",     "getopts",  "hash",   "if",
+      "jobs",    "kill",     "let",     "local", "printf", "pwd",   "read",    "readonly", "return", "set",
+      "shift",   "source",   "test",    "then",  "time",   "times", "trap",    "true",     "type",   "typeset",
+      "ulimit",  "umask",    "unalias", "unset", "until",  "wait",  "while"};
+  return std::find(std::begin(kNames), std::end(kNames), word) != std::end(kNames);
+}
+
 std::string WithoutInterpreter(const std::string& line) {
   constexpr std::string_view kInterpreter = "cmd /c ";
   return line.starts_with(kInterpreter) ? line.substr(kInterpreter.size()) : line;
+}
+
+std::string WithNameHere(const std::string& line) {
+  const std::string command = WithoutInterpreter(line);
+  const size_t end = std::min(command.find(' '), command.size());
+  return NameHere(command.substr(0, end)) + command.substr(end);
 }
 
 }  // namespace
@@ -78,10 +100,34 @@ std::string NameHere(const std::string& tool) {
   return tool == "gcc-4" && FindProgram(tool).empty() ? tool.substr(0, tool.find('-')) : tool;
 }
 
-std::string ForInterpreter(const std::string& line) {
-  const std::string command = WithoutInterpreter(line);
-  const size_t end = std::min(command.find(' '), command.size());
-  return ForShell(NameHere(command.substr(0, end)) + command.substr(end));
+std::string ForInterpreter(const std::string& line) { return ForShell(WithNameHere(line)); }
+
+std::vector<std::string> WordsWithoutInterpreter(const std::string& line) {
+  std::vector<std::string> words;
+  std::string command = WithNameHere(line);
+  bool isQuoted = false, isWithin = false;
+  for (size_t at = 0; at < command.size(); ++at) {
+    char c = command[at];
+    if (!isQuoted && IsBlank(c)) {
+      isWithin = false;
+      continue;
+    }
+    if (!isWithin) {
+      if (IsRedirection(std::string_view(command).substr(at))) return {};
+      words.emplace_back();
+      isWithin = true;
+    }
+    if (c == '"') {
+      isQuoted = !isQuoted;
+      continue;
+    }
+    if (c == '\\' && at + 1 < command.size() && command[at + 1] == '"') c = command[++at];
+    words.back() += c;
+  }
+  if (isQuoted || words.empty()) return {};
+  const std::string& program = words.front();
+  const bool isAssignment = program.find('=') != std::string::npos;
+  return isAssignment || IsOfShell(program) || !CanRun(program) ? std::vector<std::string>() : words;
 }
 
 bool IsBatchFile(const std::string& line) {

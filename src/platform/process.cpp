@@ -206,12 +206,12 @@ bool Processes::Ask(const Program& program, Running& started, int& error) {
   }
   ToolRequest request;
   request.number = started.ended.id;
-  if (started.isLine) {
+  request.words = started.isLine ? WordsWithoutInterpreter(program.line) : program.words;
+  if (request.words.empty() || (started.isLine && !FitsCommandLine(request.words))) {
     request.program = kInterpreterPath;
     request.words = {"sh", "-c", ForInterpreter(program.line)};
   } else {
-    request.program = program.words.front();
-    request.words = program.words;
+    request.program = request.words.front();
   }
   request.output = output.write.Number();
   request.errors = errors.write.Number();

@@ -4,6 +4,7 @@
 #include <malloc.h>
 #include <pthread.h>
 #include <sys/mman.h>
+#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
@@ -80,6 +81,11 @@ std::array<uint8_t, 16> MakeUuid() {
 
 namespace {
 
+bool IsExecutableFile(const std::string& path) {
+  struct stat status;
+  return access(path.c_str(), X_OK) == 0 && stat(path.c_str(), &status) == 0 && S_ISREG(status.st_mode);
+}
+
 // The file that a name on PATH stands for; empty: none.
 std::string PathOnPath(const std::string& program) {
   const std::string path = EnvironmentValue("PATH").value_or("");
@@ -87,7 +93,7 @@ std::string PathOnPath(const std::string& program) {
   while (!rest.empty()) {
     const size_t end = std::min(rest.find(kPathListSeparator), rest.size());
     std::string candidate = std::string(rest.substr(0, end)) + "/" + program;
-    if (access(candidate.c_str(), X_OK) == 0) return candidate;
+    if (IsExecutableFile(candidate)) return candidate;
     rest.remove_prefix(std::min(end + 1, rest.size()));
   }
   return {};
@@ -117,6 +123,8 @@ std::string FindProgram(const std::string& calledAs) {
   std::string path;
   return !found.empty() && RealPath(found, path) ? path : std::string();
 }
+
+bool CanRun(const std::string& calledAs) { return IsExecutableFile(FindProgram(calledAs)); }
 
 std::string ProgramPath(const std::string& calledAs) {
   std::string path(PATH_MAX, '\0');

@@ -37,6 +37,7 @@ class WorkingFolder {
 std::string ProgramPath(const std::string& calledAs);
 size_t ProcessorCount();                               // that this process may use; at least 1
 std::string FindProgram(const std::string& calledAs);  // by that word alone
+bool CanRun(const std::string& calledAs);              // that program
 uint64_t CurrentThreadId();
 bool IsProcessRunning(uint64_t id);
 struct LocalTime {

@@ -225,22 +225,23 @@ class Keeper {
     }
     if (strings.size() == 1 + head.words) strings.push_back(nullptr);
     strings.push_back(nullptr);
-    int failure[2];  // closed by the start of the tool, else gets the error
-    if (pipe2(failure, O_CLOEXEC) != 0) return m_replies.push_back({head.number, errno, 0});
     const pid_t keeper = getpid();
-    const pid_t process = fork();
+    char** const own = environ;
+    // The new process has the memory of this one until its program begins: a copy of the tables of pages would cost
+    // more than the rest of the start.
+    volatile int error = 0;
+    const pid_t process = vfork();
     if (process == 0) {
-      if (!Prepare(head, streams, keeper)) _exit(kNotRun);
-      environ = &strings[head.words + 2];
-      execvp(strings[0], &strings[1]);
-      const int error = errno;
-      [[maybe_unused]] const ssize_t told = write(failure[1], &error, sizeof error);
+      if (Prepare(head, streams, keeper)) {
+        environ = &strings[head.words + 2];  // in whose PATH the program is looked for
+        execvp(strings[0], &strings[1]);
+        error = errno;
+      }
       _exit(kNotRun);
     }
-    int error = process < 0 ? errno : 0;
-    close(failure[1]);
-    if (process > 0 && read(failure[0], &error, sizeof error) == sizeof error) waitpid(process, nullptr, 0);
-    close(failure[0]);
+    if (process < 0) error = errno;
+    environ = own;
+    if (process > 0 && error != 0) waitpid(process, nullptr, 0);
     if (error != 0) return m_replies.push_back({head.number, error, 0});
     m_tools[process] = head.number;
   }

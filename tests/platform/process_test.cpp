@@ -12,6 +12,7 @@
 #include <sstream>
 
 #include "platform/file_system.h"
+#include "platform/interpreter.h"
 #include "platform/system.h"
 #include "world_fixture.h"
 
@@ -170,6 +171,27 @@ TEST_F(ProcessTest, Commands) {
     EXPECT_EQ(0, Code("touch " + text)) << text;
     EXPECT_TRUE(std::filesystem::remove(text)) << text;
   }
+}
+
+// A line that needs no shell is run without one; 2>&1 needs it.
+TEST_F(ProcessTest, TheSameWithAShellAndWithout) {
+  Write("bin/show", "#!/bin/sh\nfor word; do printf '<%s>' \"$word\"; done\nexit 5\n");
+  std::filesystem::permissions("bin/show", std::filesystem::perms::owner_all);
+  std::filesystem::create_directory("bin/folder");
+  const std::string path = std::getenv("PATH");
+  SetEnvironment("PATH", "bin:/bin:/usr/bin");
+  int plainCount = 0;
+  for (const std::string line :
+       {R"(show a  "b c" "" x"y"z)", R"(cmd /c show \"a\" "b\"c" d\e "f\g" h\)",
+        R"("show" 'x' $HOME ~ {a,b} [x]* #c !)", "show \t a\n b \xc3\xa4", R"(show "a;b|c<d>e" 3>x)", "A=b show x",
+        "show \"open", "echo \\t", "if x", "folder", "nowhere x", "bin/show z", "./bin/folder"}) {
+    auto ended = tools.Run(Quiet(line)), expected = tools.Run(Quiet(line + " 2>&1"));
+    EXPECT_EQ(expected.output.Take(), ended.output.Take()) << line;
+    EXPECT_EQ(expected.end.InterpreterCode(), ended.end.InterpreterCode()) << line;
+    plainCount += WordsWithoutInterpreter(line).empty() ? 0 : 1;
+  }
+  EXPECT_EQ(6, plainCount);
+  SetEnvironment("PATH", path);
 }
 
 TEST_F(ProcessTest, CompilerOfTheGccFamily) {
