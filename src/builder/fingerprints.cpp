@@ -1,6 +1,7 @@
 #include "builder/fingerprints.h"
 
 #include <algorithm>
+#include <cstring>
 
 #include "builder/payload.h"
 #include "text/paths.h"
@@ -40,7 +41,7 @@ PrintMixer& PrintMixer::Add(std::string_view text) {
   Add(text.size());
   for (; !text.empty(); text.remove_prefix(std::min<size_t>(text.size(), 8))) {
     uint64_t word = 0;
-    for (const char c : text.substr(0, 8)) word = word << 8 | static_cast<unsigned char>(c);
+    std::memcpy(&word, text.data(), std::min<size_t>(text.size(), 8));
     Add(word);
   }
   return *this;

@@ -2,7 +2,9 @@
 // length and their bytes.
 #pragma once
 
+#include <bit>
 #include <cstdint>
+#include <cstring>
 #include <string>
 #include <string_view>
 
@@ -23,7 +25,11 @@ class PayloadReader {
   uint64_t Number(size_t bytes) {
     if (m_rest.size() < bytes) throw DeserialisationException();
     uint64_t value = 0;
-    for (size_t i = bytes; i-- > 0;) value = value << 8 | static_cast<unsigned char>(m_rest[i]);
+    if constexpr (std::endian::native == std::endian::little) {
+      std::memcpy(&value, m_rest.data(), bytes);
+    } else {
+      for (size_t i = bytes; i-- > 0;) value = value << 8 | static_cast<unsigned char>(m_rest[i]);
+    }
     m_rest.remove_prefix(bytes);
     return value;
   }

@@ -128,7 +128,13 @@ void ProjectBuilder::ReadTimes() {
     file->times.target = found[at].time;
     file->times.targetSize = found[at++].size;
   }
-  for (; at < asked.size(); ++at) m_objects.try_emplace(std::move(asked[at]), Object{found[at]});
+  if (at == asked.size()) return;
+  m_objectsOf.resize(FileCount());
+  for (const ScannedFile* file : scanned) {
+    if (!HasObject(file->file)) continue;
+    m_objectsOf[file->index] = &*m_objects.try_emplace(std::move(asked[at]), Object{found[at]}).first;
+    ++at;
+  }
 }
 
 // A little more or less comes of what is met on the way.
@@ -137,8 +143,8 @@ size_t ProjectBuilder::ExpectedSteps() const {
   for (const ScannedFile* file : scanned) {
     bool isMade = file->needsWriting;
     if (RunsTools() && HasObject(file->file) && !isMade) {
-      const auto object = m_objects.find(paths.Object(file->file));
-      isMade = object == m_objects.end() || object->second.stamp.time <= file->times.target;
+      const auto* const object = file->index < m_objectsOf.size() ? m_objectsOf[file->index] : nullptr;
+      isMade = !object || object->second.stamp.time <= file->times.target;
     }
     if (isMade && (!RunsTools() || HasObject(file->file))) ++count;
   }
@@ -196,13 +202,23 @@ void ProjectBuilder::CompileResourceIfStale(ScannedFile& file) {
   });
 }
 
+ProjectBuilder::Objects::value_type& ProjectBuilder::ObjectOf(const ScannedFile& file) {
+  if (file.index >= m_objectsOf.size()) m_objectsOf.resize(FileCount());
+  Objects::value_type*& object = m_objectsOf[file.index];
+  if (!object) {
+    const auto [known, isNew] = m_objects.try_emplace(paths.Object(file.file));
+    if (isNew) known->second.stamp = times.StampOf(known->first);
+    object = &*known;
+  }
+  return *object;
+}
+
 void ProjectBuilder::CompileIfStale(ScannedFile& file) {
-  const std::string path = paths.Object(file.file);
-  const auto [known, isNew] = m_objects.try_emplace(path);
-  Object& object = known->second;
+  auto& known = ObjectOf(file);
+  const std::string& path = known.first;
+  Object& object = known.second;
   if (!object.source) object.source = &file.file;
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
-  if (isNew) object.stamp = times.StampOf(path);
   const bool isStale = LatestTargetTime(*this, file) >= object.stamp.time || LiesAhead(*this, object.stamp.time);
   if (!isStale && !(m_prints && m_prints->DiffersObject(file, object.stamp))) return;
   if (settings.observer) {
@@ -211,7 +227,7 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   }
   if (!Translate(file)) return;
   const uint64_t print = m_prints ? m_prints->ObjectPrint(file) : 0;
-  scheduler.Add(ObjectStep(*this, file), [this, path, print, &object, &file](bool succeeded) {
+  scheduler.Add(ObjectStep(*this, file), [this, &path, print, &object, &file](bool succeeded) {
     m_hasFailed = m_hasFailed || !succeeded;
     object.stamp = times.StampOf(path);
     settings.made.insert(path);
@@ -296,10 +312,8 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   const bool liesAhead = LiesAhead(*this, targetTime);
   const bool isCurrent = targetTime != 0 && later == watched.end() && !liesAhead;
   if (m_prints) {
-    std::vector<FileStamp> stamps;
-    for (const std::string& input : watched) stamps.push_back(stampOf(input));
-    const TargetCommand command = TargetCommandOf(project, config, target, inputs);
-    m_linkPrint = m_prints->TargetPrint(command.tool + "\n" + command.text, stamps);
+    const TargetCommand command = TargetCommandOf(project, config, target, {});
+    m_linkPrint = m_prints->TargetPrint(command.tool + "\n" + command.text, watched, stampOf);
   }
   if (isCurrent && !(m_prints && m_prints->Differs(target, m_linkPrint, targetStamp))) return nullptr;
   if (settings.observer) {

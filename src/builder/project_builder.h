@@ -38,6 +38,7 @@ class ProjectBuilder : public BuildFiles {
     FileStamp stamp;
     const ProjectFile* source = nullptr;
   };
+  using Objects = std::unordered_map<std::string, Object>;  // by path
 
   void WriteHeading(std::string_view end) const;
   void RunSteps(const ProjectFile* singleFile);
@@ -56,6 +57,7 @@ class ProjectBuilder : public BuildFiles {
   void LearnNames(ScannedFile& file);
   void CompileResourceIfStale(ScannedFile& file);
   void CompileIfStale(ScannedFile& file);
+  Objects::value_type& ObjectOf(const ScannedFile& file);
   void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
   std::unique_ptr<BuildStep> LinkIfStale();
@@ -64,11 +66,12 @@ class ProjectBuilder : public BuildFiles {
   std::optional<ProjectPrints> m_prints;  // where the key asks for them
   uint64_t m_linkPrint = 0;
   std::string m_dependencyFile;
-  std::string m_linked;                               // the target, while it is
-  std::unordered_map<std::string, Object> m_objects;  // as the compile steps know them, by path
-  size_t m_savedFiles = 0;                            // that the dependency file knew
-  bool m_hasStaleFiles = false;                       // as judged from the dependency file and the times
-  bool m_hasFailed = false;                           // a step has
+  std::string m_linked;                           // the target, while it is
+  Objects m_objects;                              // as the compile steps know them
+  std::vector<Objects::value_type*> m_objectsOf;  // the same by the index of a source, as far as it was asked for
+  size_t m_savedFiles = 0;                        // that the dependency file knew
+  bool m_hasStaleFiles = false;                   // as judged from the dependency file and the times
+  bool m_hasFailed = false;                       // a step has
   bool m_hasFaultyFiles = false;
 };
 

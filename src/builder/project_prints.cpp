@@ -86,10 +86,11 @@ uint64_t ProjectPrints::ResourcePrint(const FileStamp& source) const {
   return PrintMixer().Add(m_command).Add(switches.TakeText()).Add(source).Value();
 }
 
-uint64_t ProjectPrints::TargetPrint(std::string_view command, const std::vector<FileStamp>& inputs) const {
+uint64_t ProjectPrints::TargetPrint(std::string_view command, const std::vector<std::string>& inputs,
+                                    const std::function<FileStamp(const std::string&)>& stampOf) const {
   PrintMixer mixer;
   mixer.Add(command);
-  for (const FileStamp& input : inputs) mixer.Add(input);
+  for (const std::string& input : inputs) mixer.Add(input).Add(stampOf(input));
   return mixer.Value();
 }
 

@@ -2,6 +2,7 @@
 #pragma once
 
 #include <cstdint>
+#include <functional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -22,7 +23,9 @@ class ProjectPrints {
 
   uint64_t ObjectPrint(ScannedFile& file) const;
   uint64_t ResourcePrint(const FileStamp& source) const;
-  uint64_t TargetPrint(std::string_view command, const std::vector<FileStamp>& inputs) const;
+  // Of a link: what its command has beside the inputs, and those.
+  uint64_t TargetPrint(std::string_view command, const std::vector<std::string>& inputs,
+                       const std::function<FileStamp(const std::string&)>& stampOf) const;
 
   // Print 0: it could not be made.
   void Made(const ScannedFile& file, const OutputPrint& object) { m_known.NoteObject(file, object); }

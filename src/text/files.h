@@ -40,6 +40,7 @@ class FileTimes {
  private:
   static constexpr size_t kMostDirectories = 64;  // each takes a descriptor
   std::unordered_map<std::string, std::unique_ptr<platform::DirectoryTimes>> m_directories;
+  decltype(m_directories)::value_type* m_last = nullptr;  // of the file that was asked for last
 };
 std::vector<FileStamp> StampsOf(const std::vector<std::string>& paths);  // of many files, by several threads
 platform::Result TouchFile(const std::string& path, bool create);
