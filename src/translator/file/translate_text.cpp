@@ -61,9 +61,12 @@ void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expan
     WriteProjectRegistration(file, file.host.RegisterMap(), out);
     WriteProjectRegistration(file, file.host.UnregisterMap(), out);
   }
-  if (kind == FileKind::H) out << "\n#endif // include guard\n";
   out.Flush();
   if (directives) directives->Finish();
+  TextWriter behind(target);
+  TextWriter& foot = directives ? behind : out;  // which came of no line
+  if (kind == FileKind::H) foot << "\n#endif // include guard\n";
+  foot.Flush();
 }
 
 TextRange SourceOf(const ScannedFile& file) {

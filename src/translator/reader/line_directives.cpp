@@ -146,7 +146,7 @@ void LineDirectives::Pass(char c, const char* at) {
       m_blanks += c;
       return;
     }
-    MoveTo(WantedAt(at), c, at ? Origin::Copied : Origin::Generated);
+    MoveTo(WantedAt(at), c);
   }
   if (m_isLineFresh) {
     m_lineSource = WantedAt(at).position;
@@ -186,15 +186,14 @@ bool LineDirectives::PadsTo(const SourceLine& wanted) const {
 }
 
 // Ahead of the first byte of a word: the blanks that were held back, and what else it takes.
-void LineDirectives::MoveTo(const SourceLine& wanted, char next, Origin origin) {
+void LineDirectives::MoveTo(const SourceLine& wanted, char next) {
   const std::string blanks = std::exchange(m_blanks, {});
   const int64_t lineFeeds = std::count(blanks.begin(), blanks.end(), '\n');
   const std::string_view indentation = std::string_view(blanks).substr(blanks.rfind('\n') + 1);
   const bool follows =
       m_state.IsLineNumberKnown() && wanted.path == m_here.path && wanted.line == m_here.line + lineFeeds;
   const bool mayBreak = !blanks.empty() || m_state.AtLineStart() || m_state.MayBreakBehind();
-  const bool isFree = origin == Origin::Generated && next == '#';  // its line number means nothing
-  if (follows || !mayBreak || !wanted.path || isFree) {
+  if (follows || !mayBreak || !wanted.path) {
     PutBlanks(blanks);
   } else if (PadsTo(wanted)) {
     PutBlanks(std::string(static_cast<size_t>(wanted.line - m_here.line), '\n'));

@@ -79,14 +79,13 @@ class LineDirectives {
   const char* SourceOf(const char* expanded) { return m_markedPlaces.Find(expanded).source; }
 
  private:
-  enum class Origin { Generated, Copied };
   void PassGenerated(char c);
   bool TakeMark(char c);
   void ReleaseSlash();
   void Pass(char c, const char* at);
   const SourceLine& WantedAt(const char* at);
   const SourceLine& LineOfExpanded(const char* at);
-  void MoveTo(const SourceLine& wanted, char next, Origin origin);
+  void MoveTo(const SourceLine& wanted, char next);
   bool JoinsLine(const SourceLine& wanted, char next, int64_t lineFeeds) const;
   bool PadsTo(const SourceLine& wanted) const;
   void WriteDirective(const SourceLine& wanted);
