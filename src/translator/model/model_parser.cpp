@@ -265,6 +265,7 @@ void ModelBlock::ParseEvolveEntry(std::vector<Evolution>& evolutions) {
   SkipWhiteSpace(code);
   while (!code.Empty() && (code.end[-1] == ' ' || (code.end[-1] >= 9 && code.end[-1] <= 13))) --code.end;
   field.m_evolveCode = MarkedText(m_parser, code.begin, code.end);
+  if (!field.m_evolveCode.empty()) field.m_evolveCode += m_parser.EndMark();
   m_parser.Advance();
 }
 

@@ -111,7 +111,9 @@ class CodeText {
 
   std::string TextTo(const char* end) {
     Take(end, end);
-    return Trimmed(m_text.data(), m_text.data() + m_text.size());
+    std::string text = Trimmed(m_text.data(), m_text.data() + m_text.size());
+    if (!text.empty()) text += m_parser.EndMark();
+    return text;
   }
 
  private:

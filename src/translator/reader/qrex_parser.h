@@ -93,6 +93,8 @@ class QrexParser : public ExpressionParser {
   void DropToCurrent() { DropTo(current.text.begin); }
   void DropBehindCurrent() { DropTo(current.text.end); }
   void Flush() { out.Flush(); }
+  // Behind marked text that ends at the current token: what is generated next is on no line of that text.
+  std::string EndMark() { return stream.MarkOf(current.text.begin); }
 
   // --- Tokens beyond ParserBase.
   bool Is(std::string_view word) const { return current.text == word; }
