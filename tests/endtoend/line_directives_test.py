@@ -119,6 +119,8 @@ def bounded(workspace):
         written = path.read_text().count("\n#line ")
         source = next((p for p in (workspace.path("tree") / path.relative_to(workspace.path(OUT)),
                                    ROOT / "runtime" / path.relative_to(workspace.path(OUT))) if p.exists()), None)
+        if re.search("@for|@while", source.read_text()):
+            continue  # each turn may begin with one
         declarations = len(re.findall(r"\$\w+|@\w+", source.read_text()))
         assert written <= 1 + declarations, f"{path.name}: {written} directives, {declarations} declarations"
 
@@ -163,7 +165,7 @@ def messages(binary):
     counts = []
     for keys in ("", KEY):
         with shop(binary, keys + " translateOnly = false ", MAIN.replace("left == 19", "lost")) as workspace:
-            counts.append(re.findall(r"\d+ errors?.*\d+ warnings?.*|.*[Ee]rrors?\b.*\d.*", workspace.output)[-1:])
+            counts.append(re.findall(r"Completed with [^.]*", workspace.output))
             (holds if keys else lacks)(workspace.output, "tree/app/src/app.cpp:")
     equal(counts[1], counts[0])
 

@@ -10,7 +10,6 @@ namespace qrex {
 namespace {
 
 constexpr int64_t kMostEmptyLines = 8;  // in place of a directive
-constexpr size_t kLongestLine = 4000;   // joined; compilers give up columns in longer ones
 constexpr size_t kBufferSize = 16 << 10;
 
 bool IsBlank(char c) { return c == ' ' || c == '\n' || c == '\t' || c == '\r' || c == '\f' || c == '\v'; }
@@ -177,7 +176,7 @@ const SourceLine& LineDirectives::LineOfExpanded(const char* at) {
 bool LineDirectives::JoinsLine(const SourceLine& wanted, char next, int64_t lineFeeds) const {
   if (lineFeeds == 0 || next == '#' || m_state.AtLineStart()) return false;
   if (m_state.InParentheses()) return true;
-  return wanted.path == m_here.path && wanted.line == m_here.line && m_column < kLongestLine;
+  return wanted.path == m_here.path && wanted.line == m_here.line;
 }
 
 bool LineDirectives::PadsTo(const SourceLine& wanted) const {
@@ -203,7 +202,7 @@ void LineDirectives::MoveTo(const SourceLine& wanted, char next) {
   } else if (m_state.InParentheses()) {
     PutBlanks(blanks);
   } else {
-    if (!m_state.AtLineStart() || m_column > 0) Put('\n');
+    if (!m_isLineEmpty) Put('\n');
     WriteDirective(wanted);
     PutBlanks(indentation);
   }
@@ -228,11 +227,11 @@ void LineDirectives::PutBlanks(std::string_view blanks) {
 void LineDirectives::Put(char c) {
   m_state.Pass(c);
   m_output += c;
-  ++m_column;
+  m_isLineEmpty = false;
   if (c != '\n') return;
   m_lineTable.push_back(m_lineSource);
   m_isLineFresh = true;
-  m_column = 0;
+  m_isLineEmpty = true;
   ++m_here.line;
   if (m_output.size() < kBufferSize) return;
   m_target.Write(m_output.data(), m_output.size());

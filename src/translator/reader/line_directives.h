@@ -101,7 +101,7 @@ class LineDirectives {
   SourceLine m_here;                   // of the output's line, as a compiler counts
   const char* m_lineSource = nullptr;  // what the line table gets for it
   bool m_isLineFresh = true;
-  size_t m_column = 0;
+  bool m_isLineEmpty = true;
   std::string m_blanks;  // held back: what follows decides on them
   // Of the last place that was asked for, and how far it holds in the expanded text.
   SourceLine m_found;
