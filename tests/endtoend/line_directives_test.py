@@ -104,7 +104,7 @@ def check_lines(workspace, sources, include):
         for source in sources:
             for name, number, text in compiled_lines(workspace, compiler, source, include):
                 if name not in texts:
-                    texts[name] = [line.strip() for line in workspace.path(name).read_text().splitlines()]
+                    texts[name] = [re.sub("//.*", "", line).strip() for line in workspace.path(name).read_text().splitlines()]
                 lines = texts[name]
                 assert not text or number <= len(lines), f"{name} has no line {number}: {text}"
                 if len(text) > 8 and "(" in text and lines.count(text) == 1:
