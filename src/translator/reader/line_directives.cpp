@@ -184,11 +184,13 @@ bool LineDirectives::PadsTo(const SourceLine& wanted) const {
   return m_state.InParentheses() || wanted.line - m_here.line <= kMostEmptyLines;
 }
 
-// Ahead of the first byte of a word: the blanks that were held back, and what else it takes.
+// Ahead of what is no blank: the blanks that were held back, and what else it takes.
 void LineDirectives::MoveTo(const SourceLine& wanted, char next) {
-  const std::string blanks = std::exchange(m_blanks, {});
+  const bool isHere = m_state.IsLineNumberKnown() && wanted.path == m_here.path && wanted.line == m_here.line;
+  if (isHere && m_blanks.empty()) return;
+  const std::string_view blanks = m_blanks;
   const int64_t lineFeeds = std::count(blanks.begin(), blanks.end(), '\n');
-  const std::string_view indentation = std::string_view(blanks).substr(blanks.rfind('\n') + 1);
+  const std::string_view indentation = blanks.substr(blanks.rfind('\n') + 1);
   const bool follows =
       m_state.IsLineNumberKnown() && wanted.path == m_here.path && wanted.line == m_here.line + lineFeeds;
   const bool mayBreak = !blanks.empty() || m_state.AtLineStart() || m_state.MayBreakBehind();
@@ -206,6 +208,7 @@ void LineDirectives::MoveTo(const SourceLine& wanted, char next) {
     WriteDirective(wanted);
     PutBlanks(indentation);
   }
+  m_blanks.clear();
 }
 
 void LineDirectives::WriteDirective(const SourceLine& wanted) {
