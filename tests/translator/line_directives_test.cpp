@@ -55,5 +55,31 @@ TEST_F(LineDirectivesTest, LinesAreThoseOfTheSource) {
   for (const LineCase& row : kCases) ASSERT_EQ(row.output, Of(row.source)) << row.source;
 }
 
+// A body keeps its lines, and what stands behind it is not among them; a byte of a mark in a source is none.
+TEST_F(LineDirectivesTest, BodiesHaveTheirLines) {
+  MakeWorld(App().targetType);
+  AddFile("t.h",
+          "@import \"Vesk/vxObject/IObject.h\"\n$struct S {\n$dep int32 a =\n{\n  a = 1;\n\n  a += '\x01"
+          "1';\n};\n"
+          "int end;\n};\n");
+  const std::string output = Translate("t.h");
+  const std::string body = Section(output, "void a_calc(", "int end;");
+  ASSERT_NE(body.npos, body.find("\n\n    a = 1;\n    \n      a += '\x01"
+                                 "1';\n} "))
+      << output;
+  ASSERT_EQ(body.npos, body.find("#line")) << output;
+}
+
+TEST_F(LineDirectivesTest, RecordsPointAtTheirDeclarations) {
+  MakeWorld(App().targetType);
+  AddFile("t.h", "@import \"Vesk/vxObject/IObject.h\"\n\n$enum+ A { a1 };\n\n$enum+ B { b1 };\n");
+  AddFile("t.cpp", "@import \"t.h\"\n");
+  Translate("t.h");
+  const std::string output = Translate("t.cpp");
+  const size_t a = output.find("#line 3 \"tree/app/src/t.h\"\n"), b = output.find("A_", a);
+  ASSERT_LT(a, b) << output;
+  ASSERT_LT(b, output.find("_Register_B")) << output;
+}
+
 }  // namespace
 }  // namespace qrex

@@ -12,6 +12,7 @@ namespace {
 constexpr int64_t kMostEmptyLines = 8;  // in place of a directive
 constexpr size_t kBufferSize = 16 << 10;
 
+bool IsHexDigit(char c) { return (c >= '0' && c <= '9') || (c >= 'a' && c <= 'f'); }
 bool IsBlank(char c) { return c == ' ' || c == '\n' || c == '\t' || c == '\r' || c == '\f' || c == '\v'; }
 
 }  // namespace
@@ -93,6 +94,7 @@ LineDirectives::LineDirectives(IOutputStream& target, const ScannedFile& file, s
 // --- What comes
 
 void LineDirectives::WriteCopied(const char* begin, const char* end) {
+  ReleaseMark();
   ReleaseSlash();
   m_inGeneratedComment = false;
   for (const char* at = begin; at < end; ++at) Pass(*at, at);
@@ -122,7 +124,9 @@ void LineDirectives::PassGenerated(char c) {
   }
 }
 
+// The byte of a mark may also be one of a source, with no digits behind it.
 bool LineDirectives::TakeMark(char c) {
+  if (m_mark && !IsHexDigit(c)) ReleaseMark();
   if (!m_mark) {
     if (c != kPositionMark) return false;
     ReleaseSlash();
@@ -132,6 +136,11 @@ bool LineDirectives::TakeMark(char c) {
   *m_mark += c;
   if (m_mark->size() == kMarkDigits) m_lines.Find(MarkedPosition(*std::exchange(m_mark, {})), m_marked);
   return true;
+}
+
+void LineDirectives::ReleaseMark() {
+  if (!m_mark) return;
+  for (const char c : kPositionMark + *std::exchange(m_mark, {})) Pass(c, nullptr);
 }
 
 void LineDirectives::ReleaseSlash() {
@@ -242,6 +251,7 @@ void LineDirectives::Put(char c) {
 }
 
 void LineDirectives::Finish() {
+  ReleaseMark();
   ReleaseSlash();
   PutBlanks(std::exchange(m_blanks, {}));
   m_lineTable.push_back(m_lineSource);

@@ -81,6 +81,7 @@ class LineDirectives {
  private:
   void PassGenerated(char c);
   bool TakeMark(char c);
+  void ReleaseMark();
   void ReleaseSlash();
   void Pass(char c, const char* at);
   const SourceLine& WantedAt(const char* at);
