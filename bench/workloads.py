@@ -244,3 +244,31 @@ def reflected_classes(root, count, per_header=10):
     write(f"{root}/moc/classes.h", "".join(moc))
     os.makedirs(f"{root}/cpp", exist_ok=True)
     return [f"p{header}.proto" for header in range(headers)]
+
+
+# --- Directives
+
+def write_lines(root):
+    with open(f"{root}/main.qrex", "a", newline="\n") as file:
+        file.write("lineDirectives = true\n")
+
+
+def count_directives(root):
+    """Of the outputs, and the most there may be: one for each file and declaration, of which a tail has text of its own, two
+    for each call of a macro."""
+    written = most = 0
+    for folder, _, names in os.walk(f"{root}/tree/app"):
+        for name in names:
+            if name.endswith((".h", ".cpp")):
+                with open(os.path.join(folder, name)) as file:
+                    text = file.read()
+                macros = re.findall(r"^@def (\w+)", text, re.MULTILINE)
+                calls = len(re.findall(rf"\b(?:{'|'.join(macros)})\b", text)) - len(macros) if macros else 0
+                declarations = len(re.findall(r"[$@][a-zA-Z]\w*", text))
+                most += 1 + declarations + 2 * calls
+    for folder, _, names in os.walk(f"{root}/qrexsource"):
+        for name in names:
+            if name.endswith((".h", ".cpp")):
+                with open(os.path.join(folder, name)) as file:
+                    written += sum(line.startswith("#line ") for line in file)
+    return written, most

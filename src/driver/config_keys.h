@@ -49,6 +49,8 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
      "also write a translation that differs in blanks and comments alone"},
     {"modernCpp", &ConfigSettings::modernCpp, "scan C, C++ and header files as C++20: raw strings, 1'000"},
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
+    {"lineDirectives", &ConfigSettings::lineDirectives,
+     "#line in generated text: debuggers and compilers speak of the sources"},
     {"ninja", &ConfigSettings::ninja, "gen writes build.ninja as well, beside make files"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},
     {"keepGoing", &ConfigSettings::keepGoing, "go on behind a translation error, tell all of them, end with status 1"},

@@ -143,9 +143,10 @@ bool FollowedFiles::Back(const std::string& file, int64_t line, int64_t column, 
 void FollowedFiles::Index(Followed& followed) {
   followed.isIndexed = true;
   const std::string own = followed.scanned->SourcePath();
-  const int64_t count = LinesOf(followed.generatedPath).Count();
+  const TextLines& generated = LinesOf(followed.generatedPath);
   std::string path;
-  for (int64_t line = 1, source; line <= count; ++line) {
+  for (int64_t line = 1, source; line <= generated.Count(); ++line) {
+    if (followed.scanned->HasLineDirectives() && generated.Line(line).starts_with("#line ")) continue;
     if (SourceOf(followed, line, path, source) && path == own) followed.firstGenerated.emplace(source, line);
   }
 }

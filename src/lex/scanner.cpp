@@ -182,13 +182,18 @@ int64_t LineStarts::LineOf(const char* position) const {
   return std::upper_bound(m_starts.begin(), m_starts.end(), position) - m_starts.begin();
 }
 
-bool SameTokens(LexScanner a, LexScanner b) {
+bool SameTokens(LexScanner a, LexScanner b, Lines lines) {
+  const auto linesTo = [](const char* begin, const LexToken& token) {
+    return std::count(begin, token.text.begin, '\n');
+  };
   for (;;) {
+    const char *const aheadOfA = a.begin, *const aheadOfB = b.begin;
     const LexToken tokenA = NextToken(a);
     const LexToken tokenB = NextToken(b);
     if (tokenA.kind != tokenB.kind) return false;
     if (tokenA.kind == kEndOfText) return true;
     if (!(tokenA.text == tokenB.text)) return false;
+    if (lines == Lines::Counted && linesTo(aheadOfA, tokenA) != linesTo(aheadOfB, tokenB)) return false;
   }
 }
 

@@ -118,7 +118,9 @@ class LineStarts {
   TextRange m_text;
   std::vector<const char*> m_starts;
 };
-bool SameTokens(LexScanner a, LexScanner b);  // same kinds and texts, comments dropped
+// Same kinds and texts, comments dropped; where lines count, also as many lines ahead of each.
+enum class Lines { Ignored, Counted };
+bool SameTokens(LexScanner a, LexScanner b, Lines lines = Lines::Ignored);
 
 class ParserBase {
  public:

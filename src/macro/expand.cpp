@@ -377,6 +377,7 @@ TextRange ExpandWithMap(ImportHandler* handler, LSFrame& frame, const TextRange&
   } restore{frame.World().nesting};
   if (handler) restore.nesting = 0;
   OpenSink sink(frame.World());
+  sink.map.calls = std::move(map.calls);
   sink.expectedSize = text.Size() + text.Size() / (text.Size() < kLargeText ? 4 : 1);
   const bool changed = ExpansionContext(handler, frame, text, stripIndent, outIndent, sink, nullptr).RunUnlessPlain();
   map = std::move(sink.map);

@@ -27,6 +27,7 @@ std::string ExpandToString(ImportHandler* handler, LSFrame& frame, const TextRan
 // itself then, else what it put into `storage`.
 std::string ExpandToStringWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
                                   int64_t outIndent, SourceMap& map);
+// Keeps the calls if the map that it is given does.
 TextRange ExpandWithMap(ImportHandler* handler, LSFrame& frame, const TextRange& text, int64_t stripIndent,
                         int64_t outIndent, std::string& storage, SourceMap& map);
 std::string EvaluateAsText(LSFrame& frame, const TextRange& text, VarType type);

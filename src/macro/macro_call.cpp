@@ -37,6 +37,7 @@ std::shared_ptr<const BodyWords> LSMacroVariable::WordsOfBody(const NamesInUse& 
 }
 
 void ExpansionContext::CallVariable(LSVariable& variable) {
+  const NotedCall noted(m_sink, AnchorForTemporary()->begin);
   if (variable.Kind() != VarType::Macro) {
     DropToScanner();
     return EmitGenerated(variable.ValueText());

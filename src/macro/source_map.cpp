@@ -192,6 +192,17 @@ void ExpansionSink::WriteGenerated(std::string_view text, const char* source, Li
   map.AddGenerated(source, output.size() - before);
 }
 
+void NotedCall::Begin(const char* source) {
+  m_sink->isInCall = true;
+  m_call = {static_cast<int64_t>(m_sink->output.size()), 0, source};
+}
+
+void NotedCall::End() {
+  m_sink->isInCall = false;
+  m_call.end = static_cast<int64_t>(m_sink->output.size());
+  if (m_call.end > m_call.begin) m_sink->map.calls->push_back(m_call);
+}
+
 size_t LineIndent::ColumnsIn(std::string_view output) const {
   if (m_value >= 0) return static_cast<size_t>(m_value);
   const std::string_view before = output.substr(0, static_cast<size_t>(~m_value));

@@ -41,6 +41,12 @@ class SourceMap {
   size_t Bytes() const {  // of its runs
     return (PageSize(PageCount()) - PageSize(0) - static_cast<size_t>(m_pageEnd - m_next)) * sizeof(SourceMapRun);
   }
+  // Of an expansion whose calls are kept: what each outermost one gave, as offsets in the output, in their order.
+  struct Call {
+    int64_t begin, end;
+    const char* source;  // where it is called
+  };
+  std::unique_ptr<std::vector<Call>> calls;  // null: they are not kept
   const SourceMapRun* PageBegin(size_t page) const { return m_pages[page].get(); }
   const SourceMapRun* PageEnd(size_t page) const {
     return page + 1 == PageCount() ? m_next : PageBegin(page) + PageSize(page);
@@ -67,6 +73,9 @@ class MapCursor {
  public:
   explicit MapCursor(const SourceMap& map) : m_map(&map) {}
   const char* Map(int64_t offset);
+  // Of the run that was mapped last.
+  int64_t RunEnd() const { return m_runBegin + static_cast<int64_t>(m_run->Length()); }
+  bool IsVerbatim() const { return !m_run->IsGenerated(); }
 
  private:
   const SourceMap* m_map;
@@ -120,12 +129,32 @@ class ExpansionSink {
   SourceMap map;
   size_t expectedSize = 0;  // the room to make once there is something to write
   size_t bytesOutside = 0;  // of the expansions that wait for this one
+  bool isInCall = false;    // asked where the map keeps the calls
 
  private:
   void MakeRoom();
   bool BeginsLine(std::string_view text) const;
   void AddVerbatim(const char* begin, const char* end);
   void WriteIndented(const TextRange& range, LineIndent indent);
+};
+
+// Around a call of a macro: notes what it gave, where the map keeps that.
+class NotedCall {
+ public:
+  NotedCall(ExpansionSink& sink, const char* source) : m_sink(sink.map.calls && !sink.isInCall ? &sink : nullptr) {
+    if (m_sink) Begin(source);
+  }
+  ~NotedCall() {
+    if (m_sink) End();
+  }
+  NotedCall(const NotedCall&) = delete;
+  NotedCall& operator=(const NotedCall&) = delete;
+
+ private:
+  void Begin(const char* source);
+  void End();
+  ExpansionSink* const m_sink;
+  SourceMap::Call m_call{};
 };
 
 }  // namespace qrex

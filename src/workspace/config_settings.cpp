@@ -29,6 +29,7 @@ std::string TranslationKeys(const ConfigSettings& settings) {
   add("defaultToDll", settings.defaultToDll ? "true" : "false");
   add("modernCpp", settings.modernCpp ? "true" : "false");
   add("compilableText", settings.compilableText ? "true" : "false");
+  if (settings.lineDirectives) add("lineDirectives", "true");
   for (const std::string& root : settings.virtualTree) add("virtualTree", root);
   for (const auto& [name, value] : settings.context.rootFrame.Substitutions()) {
     const bool isOfOneRun = name == "COMPILE_FILE_PATH" || name == "TARGET_DIR";

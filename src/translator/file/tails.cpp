@@ -2,6 +2,7 @@
 
 #include "translator/emit/emit.h"
 #include "translator/kinds/type_registration.h"
+#include "translator/symbols/position_mark.h"
 #include "workspace/workspace.h"
 
 namespace qrex {
@@ -12,7 +13,10 @@ void WriteTail(ScannedFile& file, TextWriter& out, RegistrationLists& lists) {
   file.tail.isRegistered = true;
   file.rootNameSpace->WriteReflection(out, lists);
   const Registrations& own = file.registrations;
-  for (const TypeRegistration& registration : own.types) WriteTypeRegistration(out, registration, lists);
+  for (const TypeRegistration& registration : own.types) {
+    if (file.HasLineDirectives()) out << PositionMark(registration.position);
+    WriteTypeRegistration(out, registration, lists);
+  }
   lists.registerNames.insert(lists.registerNames.end(), own.registerNames.begin(), own.registerNames.end());
   lists.unregisterNames.insert(lists.unregisterNames.end(), own.unregisterNames.begin(), own.unregisterNames.end());
 }

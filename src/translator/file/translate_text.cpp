@@ -1,5 +1,8 @@
 #include "translator/file/translate_text.h"
 
+#include <memory>
+#include <optional>
+
 #include "macro/expand.h"
 #include "translator/emit/write.h"
 #include "translator/file/importer.h"
@@ -7,6 +10,7 @@
 #include "translator/file/predefined_variables.h"
 #include "translator/file/release_check.h"
 #include "translator/file/tails.h"
+#include "translator/reader/line_directives.h"
 #include "translator/reader/qrex_parser.h"
 
 namespace qrex {
@@ -27,6 +31,8 @@ void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expan
   constexpr size_t kUsualLine = 32;
   file.text.lines.reserve(expanded.Size() / kUsualLine);
   QrexParserOutputStream stream(target, file.text.lines, expanded, file.text.map);
+  std::optional<LineDirectives> directives;
+  if (file.HasLineDirectives()) stream.Use(directives.emplace(target, file, file.text.lines, expanded));
   TextWriter out(stream);
   if (kind == FileKind::H) {
     TextWriter head(target);  // not counted in the line table, which begins with the text proper
@@ -45,16 +51,22 @@ void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expan
     if (kind == FileKind::Cpp && parser.WantsCompilableText()) CheckTargetRelease(parser);
   }
   out.Flush();
-  if (const char* last = stream.SourcePosition()) file.text.lines.push_back(last);
+  const char* const last = stream.SourcePosition();
+  if (last && !directives) file.text.lines.push_back(last);
 
   file.hasDeclarations = file.rootNameSpace->HaveSomethingToRegister();
   if (kind == FileKind::Cpp) WriteReflectionTails(file, out);
+  if (directives && last) out << PositionMark(last);
   if (file.file.isMainSource) {
     WriteProjectRegistration(file, file.host.RegisterMap(), out);
     WriteProjectRegistration(file, file.host.UnregisterMap(), out);
   }
-  if (kind == FileKind::H) out << "\n#endif // include guard\n";
   out.Flush();
+  if (directives) directives->Finish();
+  TextWriter behind(target);
+  TextWriter& foot = directives ? behind : out;  // which came of no line
+  if (kind == FileKind::H) foot << "\n#endif // include guard\n";
+  foot.Flush();
 }
 
 TextRange SourceOf(const ScannedFile& file) {
@@ -73,6 +85,7 @@ void TranslateText(ScannedFile& file, IOutputStream& target) {
   TextRange expanded;
   try {
     Importer importer(file);
+    file.text.map.calls = file.HasLineDirectives() ? std::make_unique<std::vector<SourceMap::Call>>() : nullptr;
     expanded = ExpandWithMap(&importer, file.frame, SourceOf(file), 0, 0, file.text.expanded, file.text.map);
     file.place = file.host.Symbols().NextPlace();
     TranslateExpanded(file, target, expanded);

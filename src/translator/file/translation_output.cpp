@@ -17,12 +17,15 @@ void PrepareTarget(const std::string& path) {
   ChangeReadOnly(path, false);
 }
 
-bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated, Dialect dialect) {
+// With `#line` directives, positions are of the text, too: a file in which only they have moved is written.
+bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated, const ScannedFile& file) {
+  const Dialect dialect = file.frame.dialect;
+  const Lines lines = file.HasLineDirectives() ? Lines::Counted : Lines::Ignored;
   std::string old;
   if (!ReadWholeFile(old, path)) return false;
   const std::string text = generated.Text();
   try {
-    return SameTokens(LexScanner(std::string_view(old), dialect), LexScanner(std::string_view(text), dialect));
+    return SameTokens(LexScanner(std::string_view(old), dialect), LexScanner(std::string_view(text), dialect), lines);
   } catch (const LexScannerException&) {
     return false;  // the old file is not C++ that the scanner accepts
   }
@@ -73,7 +76,7 @@ int64_t ReadingTime(const ConfigSettings& settings) {
 
 void WriteOutput(ScannedFile& file, const std::string& target, GeneratedFile& generated, int64_t readTime) {
   const ConfigSettings& settings = file.host.Settings();
-  const bool isWritten = settings.writeTokenEquivalent || !IsTokenEquivalent(target, generated, file.frame.dialect);
+  const bool isWritten = settings.writeTokenEquivalent || !IsTokenEquivalent(target, generated, file);
   if (!isWritten) {
     if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
   } else {

@@ -6,6 +6,7 @@
 #include "lex/cpp_literals.h"
 #include "translator/emit/emit.h"
 #include "translator/model/model.h"
+#include "translator/reader/code_block.h"
 #include "translator/reader/qrex_parser.h"
 #include "translator/reader/qualifiers.h"
 
@@ -263,7 +264,8 @@ void ModelBlock::ParseEvolveEntry(std::vector<Evolution>& evolutions) {
   if (std::string_view(lastToken, code.end).find("//") != std::string_view::npos) code.end = lastToken;
   SkipWhiteSpace(code);
   while (!code.Empty() && (code.end[-1] == ' ' || (code.end[-1] >= 9 && code.end[-1] <= 13))) --code.end;
-  field.m_evolveCode = code.Text();
+  field.m_evolveCode = MarkedText(m_parser, code.begin, code.end);
+  if (!field.m_evolveCode.empty()) field.m_evolveCode += m_parser.EndMark();
   m_parser.Advance();
 }
 

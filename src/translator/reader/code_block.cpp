@@ -60,6 +60,22 @@ void CopyCodeBlock(QrexParser& parser, ClassDef& def) {
   parser.Flush();
 }
 
+// A mark is ahead of the first word of each line.
+std::string MarkedText(const QrexParser& parser, const char* begin, const char* end) {
+  if (!parser.file.HasLineDirectives()) return std::string(begin, end);
+  std::string text;
+  for (bool atLineStart = true; begin < end; ++begin) {
+    const bool isBlank = *begin == ' ' || (*begin >= 9 && *begin <= 13);
+    if (atLineStart && !isBlank) {
+      text += parser.stream.MarkOf(begin);
+      atLineStart = false;
+    }
+    if (*begin == '\n') atLineStart = true;
+    text += *begin;
+  }
+  return text;
+}
+
 namespace {
 
 // Text of a class body that does not stay where it is written, with what `$` means in it.
@@ -95,12 +111,14 @@ class CodeText {
 
   std::string TextTo(const char* end) {
     Take(end, end);
-    return Trimmed(m_text.data(), m_text.data() + m_text.size());
+    std::string text = Trimmed(m_text.data(), m_text.data() + m_text.size());
+    if (!text.empty()) text += m_parser.EndMark();
+    return text;
   }
 
  private:
   void Take(const char* end, const char* next) {
-    if (m_from < end) m_text.append(m_from, end);
+    if (m_from < end) m_text += MarkedText(m_parser, m_from, end);
     m_from = next;
   }
 

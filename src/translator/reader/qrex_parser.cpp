@@ -8,6 +8,7 @@
 #include "platform/system.h"
 #include "text/paths.h"
 #include "translator/reader/cpp_words.h"
+#include "translator/reader/line_directives.h"
 #include "translator/types/type_code.h"
 
 namespace qrex {
@@ -24,11 +25,13 @@ void QrexParserOutputStream::AddLines(std::string_view text) {
 }
 
 void QrexParserOutputStream::Write(const void* data, size_t length) {
+  if (m_directives) return m_directives->WriteGenerated({static_cast<const char*>(data), length});
   AddLines({static_cast<const char*>(data), length});
   m_target.Write(data, length);
 }
 
 void QrexParserOutputStream::WriteIndented(std::string_view text, size_t blanks, bool atLineStart) {
+  if (m_directives) return IOutputStream::WriteIndented(text, blanks, atLineStart);
   AddLines(text);
   m_target.WriteIndented(text, blanks, atLineStart);
 }
@@ -36,6 +39,10 @@ void QrexParserOutputStream::WriteIndented(std::string_view text, size_t blanks,
 void QrexParserOutputStream::Flush() { m_target.Flush(); }
 
 void QrexParserOutputStream::CopyRange(const char* begin, const char* end) {
+  if (m_directives) {
+    m_copied = end;
+    return m_directives->WriteCopied(begin, end);
+  }
   m_target.Write(begin, static_cast<size_t>(end - begin));
   while (const void* newline = std::memchr(begin, '\n', static_cast<size_t>(end - begin))) {
     m_copied = static_cast<const char*>(newline);
@@ -55,6 +62,10 @@ const char* QrexParserOutputStream::SourcePosition(const char* expanded) const {
   if (m_expanded.Empty()) return nullptr;
   const char* last = m_expanded.end - 1;
   return MapOutputOffset(m_map, (expanded < last ? expanded : last) - m_expanded.begin);
+}
+
+std::string QrexParserOutputStream::MarkOf(const char* expanded) {
+  return m_directives ? PositionMark(m_directives->SourceOf(expanded)) : std::string();
 }
 
 QrexParser::QrexParser(ScannedFile& file, QrexParserOutputStream& stream, TextWriter& out, TextRange expanded,

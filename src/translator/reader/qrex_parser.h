@@ -28,6 +28,7 @@
 namespace qrex {
 
 class ClassDef;
+class LineDirectives;
 
 // Receives the generated text, and keeps for each generated line the source position that it came from: that of the
 // last source text copied, so that a compiler's error in generated text points at the declaration which produced it.
@@ -35,16 +36,20 @@ class QrexParserOutputStream : public IOutputStream {
  public:
   QrexParserOutputStream(IOutputStream& target, std::vector<const char*>& lineTable, TextRange expanded,
                          const SourceMap& map);
+  // From here on the output goes through these, which are not owned and keep the line table.
+  void Use(LineDirectives& directives) { m_directives = &directives; }
   void Write(const void* data, size_t length) override;  // generated text
   void WriteIndented(std::string_view text, size_t blanks, bool atLineStart) override;
   void Flush() override;
   void CopyRange(const char* begin, const char* end);  // source text, bypassing the indentation
   const char* SourcePosition();                        // mapped position of the last source text copied; null if none
   const char* SourcePosition(const char* expanded) const;  // mapped position of an address in the expanded text
+  std::string MarkOf(const char* expanded);                // of that address, see symbols/position_mark.h
 
  private:
   void AddLines(std::string_view text);  // of generated text to the line table
   IOutputStream& m_target;
+  LineDirectives* m_directives = nullptr;
   std::vector<const char*>& m_lineTable;
   TextRange m_expanded;
   const SourceMap& m_map;
@@ -88,6 +93,8 @@ class QrexParser : public ExpressionParser {
   void DropToCurrent() { DropTo(current.text.begin); }
   void DropBehindCurrent() { DropTo(current.text.end); }
   void Flush() { out.Flush(); }
+  // Behind marked text that ends at the current token: what is generated next is on no line of that text.
+  std::string EndMark() { return stream.MarkOf(current.text.begin); }
 
   // --- Tokens beyond ParserBase.
   bool Is(std::string_view word) const { return current.text == word; }

@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "lex/token.h"
+#include "translator/symbols/position_mark.h"
 #include "translator/symbols/scanned_file.h"
 
 namespace qrex {
@@ -149,7 +150,10 @@ bool NameSpace::HaveSomethingToRegister() const {
 }
 
 void NameSpace::WriteReflection(TextWriter& out, RegistrationLists& lists) {
-  for (const auto& [elementName, element] : m_elements) element->WriteReflection(out, lists);
+  for (const auto& [elementName, element] : m_elements) {
+    if (owner.HasLineDirectives()) out << PositionMark(element->position);
+    element->WriteReflection(out, lists);
+  }
 }
 
 const Symbol* NameSpace::FindSymbol(std::string_view elementName) const {

@@ -119,6 +119,11 @@ std::string ScannedFile::UseHint(const ScannedFile& imported) const {
   return text;
 }
 
+bool ScannedFile::HasLineDirectives() const {
+  const bool isCpp = file.kind == FileKind::C || file.kind == FileKind::Cpp || file.kind == FileKind::H;
+  return isCpp && host.Settings().lineDirectives;
+}
+
 bool ScannedFile::HasTail() const {
   return hasDeclarations || !registrations.types.empty() || !registrations.registerNames.empty() ||
          !registrations.unregisterNames.empty();

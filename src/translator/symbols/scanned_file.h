@@ -62,6 +62,7 @@ class TranslationHost {
 struct TypeRegistration {
   std::string code;                  // the type code
   const NameSpace* scope = nullptr;  // the name space of the declaration
+  const char* position = nullptr;    // in the source
 };
 
 // Whether this .cpp may hold the reflection tail of an imported file: it is of the same project, and no other .cpp
@@ -117,7 +118,8 @@ class ScannedFile {
   bool MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std::string& path, int64_t& line) const;
   bool HasBegun() const { return state != TranslationState::NotBegun; }
   bool HasBegunInPass() const { return HasBegun() && !isKept; }
-  bool HasTail() const;  // once translated: it leaves something for a reflection tail
+  bool HasLineDirectives() const;  // its output is C or C++, and they are wanted
+  bool HasTail() const;            // once translated: it leaves something for a reflection tail
   // As if its translation had not begun, but for what an earlier run could know. No other file may refer to what it has
   // declared: see file/take_back.h.
   void TakeBack();

@@ -1,0 +1,234 @@
+#!/usr/bin/env python3
+"""`#line` in generated text, as compilers, debuggers and coverage read it."""
+
+import re
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from runtime_fixture import ROOT, translate, write_library  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+
+KEY = "lineDirectives = true "
+OUT = "qrexsource/x64/Debug/"
+SHOP = """@import "Vesk/vxObject/IObject.h"
+@def sum_of(a, b) =
+{
+  int sum = a;
+  sum += b;
+}
+namespace shop
+{
+$enum Kind
+{
+  small,
+  large
+};
+$struct Shelf
+{
+  $int32 pieces;
+  $dep int32 twice
+    calc
+    {
+      int unused;
+      twice = pieces * 2;
+    };
+  $int32 Sold(int32 count)
+  {
+    pieces -= count;
+    return pieces;
+  }
+  $dep int32 half =
+    {
+      half = pieces / 2;
+    };
+};
+inline int Counted(int more)
+{
+  sum_of(more, 1)
+  return sum;
+}
+}
+"""
+MAIN = """@import "shop.h"
+#include <cassert>
+
+int main(int count, char**)
+{
+  shop::Shelf shelf;
+  shelf.pieces = 7;
+  int left = shelf.Sold(2);
+  left += shop::Counted(count);
+  left += shelf.twice + shelf.half;
+  assert(left != 19);
+  return left == 19 ? 0 : 1;
+}
+"""
+
+
+def line_of(text, what):
+    return next(n for n, line in enumerate(text.splitlines(), 1) if what in line)
+
+
+def shop(binary, keys=KEY, main=MAIN, header=SHOP):
+    """The translated project `app`, with the runtime."""
+    settings = SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true {keys}'
+    files = {"all.qrex": settings, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "app" }\n',
+             "tree/app/src/shop.h": header, "tree/app/src/app.cpp": main,
+             "tree/app/src/app.qrpj": '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nqrex subproj { "Vesk/vxObject" }\n'
+                                      'config { "Debug|x64" }\n{ "src" { "shop.h" "app.cpp" } }\n'}
+    workspace = Workspace(binary, files)
+    workspace.run("all.qrex")
+    return workspace
+
+
+def compiled_lines(workspace, compiler, source, include):
+    """(file, line, text) of each line that the compiler sees of our sources."""
+    place, line = None, 0
+    for text in workspace.shell(f"{compiler} -E {include} {source}").splitlines():
+        marker = re.match(r'# (\d+) "([^"]*)"', text)
+        if marker:
+            line, place = int(marker[1]), marker[2]
+            continue
+        if place.startswith("tree/") or "/runtime/" in place:
+            yield place, line, text.strip()
+        line += 1
+
+
+def check_lines(workspace, sources, include):
+    """What stands in a source as it is has the line that it has there; no text lies behind the end of its source."""
+    checked = 0
+    for compiler in ("g++ -std=c++17", "clang++ -std=c++17"):
+        need(compiler.split()[0])
+        texts = {}
+        for source in sources:
+            for name, number, text in compiled_lines(workspace, compiler, source, include):
+                if name not in texts:
+                    texts[name] = [re.sub("//.*", "", line).strip() for line in workspace.path(name).read_text().splitlines()]
+                lines = texts[name]
+                assert not text or number <= len(lines), f"{name} has no line {number}: {text}"
+                if len(text) > 8 and "(" in text and lines.count(text) == 1:
+                    checked += 1
+                    equal((name, number, text), (name, lines.index(text) + 1, text))
+    return checked
+
+
+def bounded(workspace):
+    """As many directives as declarations, at most, and two for each call: of the text as a whole."""
+    for path in workspace.path(OUT).glob("**/*.h"):
+        written = path.read_text().count("\n#line ")
+        source = next((p for p in (workspace.path("tree") / path.relative_to(workspace.path(OUT)),
+                                   ROOT / "runtime" / path.relative_to(workspace.path(OUT))) if p.exists()), None)
+        if re.search("@for|@while", source.read_text()):
+            continue  # each turn may begin with one
+        declarations = len(re.findall(r"\$\w+|@\w+", source.read_text()))
+        assert written <= 1 + declarations, f"{path.name}: {written} directives, {declarations} declarations"
+
+
+def every_kind(binary):
+    """All declarations of the tests of the runtime, and the runtime itself: with both compilers, and as many warnings."""
+    warnings = []
+    for keys in ("", KEY):
+        workspace, root = translate(binary, "all.qrws", keys + " compilableText = true modernCpp = true ")
+        with workspace:
+            include = f"-I{root} -I{root}/kinds -I{root}/kinds/src"
+            sources = [p.relative_to(workspace.folder) for p in sorted(workspace.path(f"{root}/kinds/src").glob("*.cpp"))]
+            told = workspace.shell(f"g++ -std=c++17 -fsyntax-only -Wall -Wextra {include} {' '.join(map(str, sources))} 2>&1 || true")
+            warnings.append(sorted(re.findall(r"(?:warning|error): .*", told)))
+            if keys:
+                bounded(workspace)
+                assert check_lines(workspace, sources, include) > 500
+    equal(warnings[1], warnings[0])
+
+
+def build(workspace, compiler="g++", switches="-g -O0", program="app"):
+    """What the compiler says of the translated program; the library is compiled without the switches, as elsewhere."""
+    write_library(workspace)
+    told = ""
+    for source, options in ((f"{OUT}app/src/app.cpp", f"-Wall -Wextra {switches}"), ("library.cpp", "")):
+        told += workspace.shell(f"{compiler} -std=c++17 -I{OUT} -I{OUT}app/src -c {source} -o {Path(source).stem}.o {options}")
+    workspace.shell(f"{compiler} app.o library.o -o {program} {switches}")
+    return told
+
+
+def messages(binary):
+    """A warning, an error, an assertion and a sanitizer name the source, and a run of the tool counts them as without."""
+    need("g++")
+    place = f"tree/app/src/shop.h:{line_of(SHOP, 'int unused')}"
+    with shop(binary) as workspace:
+        holds(build(workspace), f"{place}:", "unused variable")
+        holds(workspace.shell("./app 2>&1 || true"), f"tree/app/src/app.cpp:{line_of(MAIN, 'assert(')}: ")
+        workspace.replace("tree/app/src/app.cpp", "assert(left != 19)", "left = (&left)[3]")
+        workspace.run("all.qrex")
+        build(workspace, switches="-g -fsanitize=address")
+        holds(workspace.shell("./app 2>&1 || true"), f"app.cpp:{line_of(MAIN, 'assert(')}")
+    counts = []
+    for keys in ("", KEY):
+        with shop(binary, keys + " translateOnly = false ", MAIN.replace("left == 19", "lost")) as workspace:
+            counts.append(re.findall(r"Completed with [^.]*", workspace.output))
+            (holds if keys else lacks)(workspace.output, "tree/app/src/app.cpp:")
+    equal(counts[1], counts[0])
+
+
+def debugger(binary):
+    need("gdb")
+    with shop(binary) as workspace:
+        build(workspace)
+        body, first = line_of(SHOP, "pieces -= count"), line_of(MAIN, "shelf.Sold")
+        commands = [f"break shop.h:{body}", "run", "bt", "list", "next", "next", "next", "next",
+                    f"break shop.h:{line_of(SHOP, 'half = pieces')}", "continue", "info source"]
+        workspace.write("commands.gdb", "set pagination off\nset width 0\nset style enabled off\n" + "\n".join(commands) + "\n")
+        told = workspace.shell("gdb -nx -q -batch -x commands.gdb ./app </dev/null 2>&1")
+        holds(told, f"Breakpoint 1, shop::Shelf::Sold", f"at tree/app/src/shop.h:{body}", f"{body}\t    pieces -= count;")
+        holds(told, f"in main (count=1) at tree/app/src/app.cpp:{first}", "$int32 Sold(int32 count)")
+        holds(told, f"{body + 1}\t    return pieces;", f"{first + 1}\t  left += shop::Counted(count);")
+        holds(told, f"Breakpoint 2 at 0x", f"line {line_of(SHOP, 'half = pieces')}.", "half_calc",
+              f"at tree/app/src/shop.h:{line_of(SHOP, 'half = pieces')}", "Current source file is tree/app/src/shop.h")
+        lacks(told, "qrexsource")
+
+
+def coverage(binary):
+    """Every line that ran is one of the source."""
+    need("gcov"), need("clang++")
+    for compiler, switches, report in (
+            ("g++", "--coverage -O0", "gcov -t *.gcda 2>/dev/null"),
+            ("clang++", "--coverage -O0", "llvm-cov gcov -t *.gcda 2>/dev/null")):
+        need(report.split()[0])
+        with shop(binary, main=MAIN.replace("left != 19", "left == 19")) as workspace:
+            build(workspace, compiler, switches)
+            workspace.shell("./app || true")
+            told = workspace.shell(report)
+            for name in ("shop.h", "app.cpp"):
+                holds(told, f"Source:tree/app/src/{name}")
+            lacks(told, "Source:qrexsource/x64/Debug/app")
+            for text, count in (("pieces -= count", 1), ("sum_of(more", 1), ("twice = pieces", 1), ("int more)", 1)):
+                number = line_of(SHOP, text)
+                section = told[told.index("Source:tree/app/src/shop.h"):]
+                assert re.search(rf"^ *{count}\*?: *{number}:", section, re.MULTILINE), f"{compiler}: {text}\n{section[:6000]}"
+
+
+def incremental(binary):
+    """Positions are of the text: a file in which only lines have moved is written, and the key itself makes all anew."""
+    keys = " fingerprints = true writeTokenEquivalent = false modernCpp = true "
+    with shop(binary, keys) as workspace:
+        output = workspace.path(OUT + "app/src/app.cpp")
+        plain = output.read_bytes()
+        workspace.run("all.qrex", KEY)
+        marked = output.read_bytes()
+        assert b'#line 1 "tree/app/src/app.cpp"\r\n' in marked and plain != marked
+        workspace.replace("tree/app/src/app.cpp", "int left", "/* one\n*/ int left")
+        workspace.run("all.qrex", KEY)
+        moved = output.read_bytes()
+        assert moved != marked
+        workspace.replace("tree/app/src/app.cpp", "/* one", "/* two")
+        workspace.run("all.qrex", KEY)
+        equal(output.read_bytes(), moved)
+        number = line_of(workspace.path("tree/app/src/app.cpp").read_text(), "return left")
+        there = workspace.run("--there", "all.qrex", KEY, f"tree/app/src/app.cpp:{number}").strip()
+        holds(output.read_text().splitlines()[int(there.split(":")[1]) - 1], "return left")
+        equal(workspace.run("--where", "all.qrex", KEY, there).strip(), f"tree/app/src/app.cpp:{number}")
+        workspace.run("all.qrex")
+        lacks(output.read_text(), "#line")
+
+
+run_tests([every_kind, messages, debugger, coverage, incremental])
