@@ -94,14 +94,10 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   if (settings.fingerprints) m_prints.emplace(*this, dependencyFile);
   if (dependencyFileLoaded || m_prints) ReadTimes();
   for (ScannedFile* file : scanned) {
-    const bool isStale = !dependencyFileLoaded || NeedsTranslation(*this, *file);
-    file->needsWriting = isStale || (m_prints && m_prints->DiffersTranslated(*file));
+    file->needsWriting = MustTranslate(*this, *file, Prints());
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
-    if (settings.observer) {
-      const MakeReason differs{.cause = MakeReason::Cause::Differs};
-      settings.observer->IsStale(paths.Translated(file->file), isStale ? WhyTranslated(*this, *file) : differs);
-    }
+    if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
   if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, m_savedFiles);
@@ -203,12 +199,8 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   if (!object.source) object.source = &file.file;
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
   if (isNew) object.stamp = times.StampOf(path);
-  const bool isStale = LatestTargetTime(*this, file) >= object.stamp.time || LiesAhead(*this, object.stamp.time);
-  if (!isStale && !(m_prints && m_prints->DiffersObject(file, object.stamp))) return;
-  if (settings.observer) {
-    const MakeReason differs{.cause = MakeReason::Cause::Differs};
-    settings.observer->IsStale(path, isStale ? WhyCompiled(*this, file, object.stamp.time) : differs);
-  }
+  if (!MustCompile(*this, file, object.stamp, Prints())) return;
+  if (settings.observer) settings.observer->IsStale(path, WhyCompiled(*this, file, object.stamp.time));
   if (!Translate(file)) return;
   const uint64_t print = m_prints ? m_prints->ObjectPrint(file) : 0;
   scheduler.Add(ObjectStep(*this, file), [this, path, print, &object, &file](bool succeeded) {

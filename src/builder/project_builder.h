@@ -40,6 +40,7 @@ class ProjectBuilder : public BuildFiles {
   };
 
   void WriteHeading(std::string_view end) const;
+  const ProjectPrints* Prints() const { return m_prints ? &*m_prints : nullptr; }
   void RunSteps(const ProjectFile* singleFile);
   bool IsAsSaved() const;
   void AddLastStep(std::function<void(bool)> whenOver);

@@ -59,7 +59,6 @@ class WorkspaceRun {
   ProjectFile* FindCompileFile(bool& found);
   bool CompileOneFile(ScopeTimer& timer);
   bool ShowGeneratedFile();
-  ProjectConfig* FindProjectConfig(const Project& project) const;
 
   ConfigSettings& m_settings;
   const LoadedTo m_purpose;
@@ -216,7 +215,7 @@ bool WorkspaceRun::ProcessProject(Project& project) {
   const bool isTranslated = project.usesQrex && (!project.exported || IsLibrary(project.targetType));
   if (isTranslated) return BuildProject(project);
   if (!m_queue.ExportsHeaders(project)) return true;
-  ProjectConfig* config = FindProjectConfig(project);
+  ProjectConfig* config = project.ConfigOfRun();
   if (!config) return false;
   ExportPublicHeaders(project, *config);
   return true;
@@ -285,30 +284,8 @@ void WorkspaceRun::Repackage(const Project& project) const {
   if (IsGccFamily(m_settings.compiler)) copy(GccTargetName(project));
 }
 
-namespace {
-
-std::string KnownConfigs(const Project& project) {
-  if (project.configs.empty()) return project.filePath + " has no config { ... }";
-  std::string text = project.filePath + " has";
-  for (const auto& config : project.configs) text += " " + config->name + "|" + config->platform;
-  return text;
-}
-
-}  // namespace
-
-ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
-  ProjectConfig* config = project.FindConfig(m_settings.config, m_settings.platform);
-  if (!config) {
-    const std::string wanted = m_settings.config + "|" + m_settings.platform;
-    m_settings.Tell(
-        Message(Severity::Error, "Error: ", "There is no configuration " + wanted + " in project " + project.name)
-            .WithHint(KnownConfigs(project)));
-  }
-  return config;
-}
-
 bool WorkspaceRun::BuildProject(Project& project) {
-  ProjectConfig* config = FindProjectConfig(project);
+  ProjectConfig* config = project.ConfigOfRun();
   if (!config) return false;
   return m_settings.mode == RunMode::Clean ? m_queue.Clean(project, *config) : m_queue.Build(project, *config);
 }
@@ -350,7 +327,7 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   if (file->kind != FileKind::C && file->kind != FileKind::Cpp && file->kind != FileKind::Asm) {
     return abort("not a cpp, c or asm file");
   }
-  ProjectConfig* config = FindProjectConfig(project);
+  ProjectConfig* config = project.ConfigOfRun();
   if (!config) return false;
   DeleteReporting(BuildPaths(project, *config).Translated(*file));
   if (!m_queue.Compile(project, *config, *file)) return false;
@@ -369,7 +346,7 @@ bool WorkspaceRun::ShowGeneratedFile() {
     TraceWriter() << "File is not part of an qrex project\n";
     return false;
   }
-  const ProjectConfig* config = FindProjectConfig(*file->project);
+  const ProjectConfig* config = file->project->ConfigOfRun();
   if (!config) return false;
   TraceWriter() << "\n" << PathJoin(TranslationDirectory(*config), file->path) << "(1)\n";
   return true;
@@ -465,6 +442,21 @@ bool ListWorkspace(ConfigSettings& settings, std::string& list) {
   if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
   list = ListingOf(run.Loaded());
   return true;
+}
+
+bool AnswerQuestion(ConfigSettings& settings, const Question& question) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings, LoadedTo::Ask);
+  if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
+  run.Loaded().SortProjects();
+  std::optional<std::string> answer;
+  try {
+    answer = AnswerTo(question, run.Loaded());
+  } catch (const IException& exception) {
+    settings.Tell(ErrorOf(exception));
+  }
+  if (answer) WriteToConsole(*answer);
+  return answer.has_value();
 }
 
 bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions) {

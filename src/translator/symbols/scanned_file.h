@@ -62,6 +62,7 @@ class TranslationHost {
 struct TypeRegistration {
   std::string code;                  // the type code
   const NameSpace* scope = nullptr;  // the name space of the declaration
+  const char* position = nullptr;    // in the source text
 };
 
 // Whether this .cpp may hold the reflection tail of an imported file: it is of the same project, and no other .cpp
