@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "builder/schema_lock.h"
 #include "driver/compile_commands.h"
 #include "driver/depfile.h"
 #include "driver/listing.h"
@@ -39,6 +40,7 @@ class WorkspaceRun {
   explicit WorkspaceRun(ConfigSettings& settings, LoadedTo purpose = LoadedTo::Run)
       : m_settings(settings), m_purpose(purpose), m_workspace(settings) {}
   bool LoadAll();
+  bool ReadSchemas();
   bool Run(ScopeTimer& timer);
   Workspace& Loaded() { return m_workspace; }
   bool IsCompleted() const { return m_isCompleted; }  // else an error has ended it early
@@ -63,6 +65,7 @@ class WorkspaceRun {
   ConfigSettings& m_settings;
   const LoadedTo m_purpose;
   Workspace m_workspace;
+  std::optional<SchemaLock> m_schemas;
   Generator m_generator{m_settings.leftovers};
   ProjectQueue m_queue{m_settings};
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
@@ -136,6 +139,19 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);
     m_settings.macroWorld.messages->Take(ParseErrorOf(m_settings.sourceFiles, exception));
+    return false;
+  }
+}
+
+// With the key schemaLock; only a run that translates keeps it.
+bool WorkspaceRun::ReadSchemas() {
+  const bool translates = m_settings.mode == RunMode::Build || m_settings.mode == RunMode::Compile;
+  if (m_settings.schemaLock.empty() || !translates) return true;
+  try {
+    m_settings.schemas = &m_schemas.emplace(m_settings);
+    return true;
+  } catch (const IException& exception) {
+    m_settings.Tell(ErrorOf(exception));
     return false;
   }
 }
@@ -432,7 +448,7 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (loaded) *loaded = run;
   RunObservers observers(settings);
   observers.Expect(run->Loaded());
-  const bool succeeded = run->LoadAll() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
+  const bool succeeded = run->LoadAll() && run->ReadSchemas() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
   return observers.End(run->IsCompleted()) && succeeded;
 }
 

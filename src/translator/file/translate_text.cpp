@@ -6,6 +6,7 @@
 #include "translator/file/keywords.h"
 #include "translator/file/predefined_variables.h"
 #include "translator/file/release_check.h"
+#include "translator/file/schema_check.h"
 #include "translator/file/tails.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -42,7 +43,9 @@ void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expan
   {
     QrexParser parser(file, stream, out, expanded, AllKeywords());
     parser.Translate();
-    if (kind == FileKind::Cpp && parser.WantsCompilableText()) CheckTargetRelease(parser);
+    CheckSchemas(file);
+    const bool asksForTarget = parser.WantsCompilableText() || file.host.KeepsSchemas();
+    if (kind == FileKind::Cpp && asksForTarget) CheckTargetRelease(parser);
   }
   out.Flush();
   if (const char* last = stream.SourcePosition()) file.text.lines.push_back(last);
