@@ -3,6 +3,7 @@
 #include <algorithm>
 
 #include "builder/build_observer.h"
+#include "builder/schema_lock.h"
 #include "translator/file/translate_file.h"
 
 namespace qrex {
@@ -88,6 +89,14 @@ void BuildFiles::TranslationBegins(const ScannedFile& file) {
 
 void BuildFiles::TranslationEnds(const ScannedFile& file) {
   if (settings.observer) settings.observer->TranslationEnds(file);
+}
+
+std::string BuildFiles::SchemaFault(const ClassDef& def) { return settings.schemas->Fault(def); }
+
+void BuildFiles::DefinesTarget(const ScannedFile& file, int64_t release, const char* position) {
+  if (file.file.project != &project) return;
+  target = {release, file.file.path, {}};
+  FindSourcePlace(position, target.place);
 }
 
 void BuildFiles::TakenBack(ScannedFile& file) {

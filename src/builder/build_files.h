@@ -19,6 +19,13 @@ namespace qrex {
 // Of an error that ended a translation, or a run.
 Message ErrorOf(const IException& exception);
 
+// Where a source defines the target of its project, and with which release; -1: none is known to.
+struct DefinedTarget {
+  int64_t release = -1;
+  std::string path = {};  // in the tree
+  SourcePlace place = {};
+};
+
 class BuildFiles : public TranslationHost {
  public:
   BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig& config);
@@ -42,6 +49,9 @@ class BuildFiles : public TranslationHost {
   void TakenBack(ScannedFile& file) override;
   void TranslationBegins(const ScannedFile& file) override;
   void TranslationEnds(const ScannedFile& file) override;
+  bool KeepsSchemas() const override { return settings.schemas != nullptr; }
+  std::string SchemaFault(const ClassDef& def) override;
+  void DefinesTarget(const ScannedFile& file, int64_t release, const char* position) override;
   bool FindSourcePlace(const char* position, SourcePlace& place) const override;
 
   ConfigSettings& settings;
@@ -60,6 +70,7 @@ class BuildFiles : public TranslationHost {
   FileTimes times;
   bool dependencyFileLoaded = false;
   int64_t warningCount = 0, errorCount = 0;
+  DefinedTarget target;  // with the key schemaLock, as far as it was translated
 
  private:
   const ScannedFile* FileOfPosition(const char* position) const;  // whose source text holds it; or null

@@ -60,6 +60,8 @@ class Fingerprints {
   void Note(const ScannedFile& file, const FileStamp& source, const OutputPrint& translation);
   void NoteObject(const ScannedFile& file, const OutputPrint& object);
   void Note(const std::string& output, const OutputPrint& made);
+  const std::string& Keys() const { return m_keys; }
+  const std::string& Command() const { return m_command; }
   void SetTexts(std::string keys, std::string command);
 
  private:

@@ -1,6 +1,7 @@
 #include "builder/make_reason.h"
 
 #include <algorithm>
+#include <unordered_map>
 #include <unordered_set>
 
 #include "builder/staleness.h"
@@ -41,9 +42,26 @@ MakeReason MissingSource(BuildFiles& builder, ScannedFile& file) {
   return {Cause::InputMissing, file.SourcePath()};
 }
 
+bool IsTranslationStale(BuildFiles& builder, ScannedFile& file) {
+  return !builder.dependencyFileLoaded || NeedsTranslation(builder, file);
+}
+
+bool IsObjectStale(BuildFiles& builder, ScannedFile& file, int64_t objectTime) {
+  return LatestTargetTime(builder, file) >= objectTime || LiesAhead(builder, objectTime);
+}
+
 }  // namespace
 
+bool MustTranslate(BuildFiles& builder, ScannedFile& file, const ProjectPrints* prints) {
+  return IsTranslationStale(builder, file) || (prints && prints->DiffersTranslated(file));
+}
+
+bool MustCompile(BuildFiles& builder, ScannedFile& file, const FileStamp& object, const ProjectPrints* prints) {
+  return IsObjectStale(builder, file, object.time) || (prints && prints->DiffersObject(file, object));
+}
+
 MakeReason WhyTranslated(BuildFiles& builder, ScannedFile& file) {
+  if (!IsTranslationStale(builder, file)) return {Cause::Differs};
   if (builder.settings.rebuildAll) return {Cause::RebuildAll};
   if (!builder.dependencyFileLoaded) return {Cause::NothingKnown};
   if (file.times.target == 0) return {Cause::Missing};
@@ -58,8 +76,25 @@ MakeReason WhyTranslated(BuildFiles& builder, ScannedFile& file) {
 
 MakeReason WhyCompiled(BuildFiles& builder, ScannedFile& file, int64_t objectTime) {
   if (objectTime == 0) return {Cause::Missing};
+  if (!IsObjectStale(builder, file, objectTime)) return {Cause::Differs};
   if (LatestTargetTime(builder, file) < objectTime) return {Cause::Ahead};
   return Newest(file, &KnownTimes::latestTarget, [](const ScannedFile& at) { return at.times.target; });
+}
+
+std::vector<const ScannedFile*> ImportChain(const ScannedFile& file, const std::string& sourcePath) {
+  std::unordered_map<const ScannedFile*, const ScannedFile*> importerOf{{&file, nullptr}};
+  std::vector<const ScannedFile*> open{&file}, chain;
+  for (size_t next = 0; next < open.size(); ++next) {
+    const ScannedFile* const at = open[next];
+    if (at->SourcePath() == sourcePath) {
+      for (const ScannedFile* step = at; step; step = importerOf[step]) chain.insert(chain.begin(), step);
+      break;
+    }
+    for (const ScannedFile* import : at->imports) {
+      if (importerOf.try_emplace(import, at).second) open.push_back(import);
+    }
+  }
+  return chain;
 }
 
 }  // namespace qrex

@@ -57,9 +57,25 @@ void ProjectBuilder::Begin(const std::string& dependencyFile, const ProjectFile*
 void ProjectBuilder::RunSteps(const ProjectFile* singleFile) {
   try {
     for (ScannedFile* file : scanned) ProcessFile(*file, singleFile);
+    if (m_schemas && !singleFile) CheckSchemas();
   } catch (const IException&) {
     scheduler.WaitForAll();  // what was begun ahead of the error is finished
     throw;
+  }
+}
+
+void ProjectBuilder::CheckSchemas() {
+  if (m_hasFaultyFiles) return;  // the next run sees what they declare
+  try {
+    m_schemas->Check();
+  } catch (const FaultyFileException&) {
+    m_hasFailed = m_hasFaultyFiles = true;
+  } catch (const LexScannerException& exception) {
+    if (!settings.keepGoing) throw;
+    m_hasFailed = true;
+    ++errorCount;
+    settings.faulty.insert(exception.file);
+    settings.Tell(ErrorOf(exception));
   }
 }
 
@@ -92,16 +108,13 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   m_savedFiles = FileCount();
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (settings.fingerprints) m_prints.emplace(*this, dependencyFile);
+  if (settings.schemas && !project.exported) m_schemas.emplace(*this, *settings.schemas, dependencyFile);
   if (dependencyFileLoaded || m_prints) ReadTimes();
   for (ScannedFile* file : scanned) {
-    const bool isStale = !dependencyFileLoaded || NeedsTranslation(*this, *file);
-    file->needsWriting = isStale || (m_prints && m_prints->DiffersTranslated(*file));
+    file->needsWriting = MustTranslate(*this, *file, Prints());
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
-    if (settings.observer) {
-      const MakeReason differs{.cause = MakeReason::Cause::Differs};
-      settings.observer->IsStale(paths.Translated(file->file), isStale ? WhyTranslated(*this, *file) : differs);
-    }
+    if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
   if (dependencyFileLoaded && m_hasStaleFiles) FindTailHolders(*this, m_savedFiles);
@@ -219,12 +232,8 @@ void ProjectBuilder::CompileIfStale(ScannedFile& file) {
   Object& object = known.second;
   if (!object.source) object.source = &file.file;
   if (object.source != &file.file) return ReportSharedObject(path, file.file, *object.source);
-  const bool isStale = LatestTargetTime(*this, file) >= object.stamp.time || LiesAhead(*this, object.stamp.time);
-  if (!isStale && !(m_prints && m_prints->DiffersObject(file, object.stamp))) return;
-  if (settings.observer) {
-    const MakeReason differs{.cause = MakeReason::Cause::Differs};
-    settings.observer->IsStale(path, isStale ? WhyCompiled(*this, file, object.stamp.time) : differs);
-  }
+  if (!MustCompile(*this, file, object.stamp, Prints())) return;
+  if (settings.observer) settings.observer->IsStale(path, WhyCompiled(*this, file, object.stamp.time));
   if (!Translate(file)) return;
   const uint64_t print = m_prints ? m_prints->ObjectPrint(file) : 0;
   scheduler.Add(ObjectStep(*this, file), [this, &path, print, &object, &file](bool succeeded) {
@@ -337,8 +346,23 @@ bool ProjectBuilder::IsAsSaved() const {
          });
 }
 
+// False, with an error told, where releases could not be recorded: then no file may count as translated.
+bool ProjectBuilder::SaveSchemas() {
+  if (!settings.schemas) return true;
+  try {
+    settings.schemas->Write();
+    if (m_schemas) m_schemas->Save();
+    return true;
+  } catch (const IException& exception) {
+    settings.faulty.insert(settings.schemaLock);
+    settings.Tell(ErrorOf(exception));
+    return false;
+  }
+}
+
 // A registration that the main source does not hold yet must not be lost: saved with time 0 it is written again.
 void ProjectBuilder::Save() {
+  if (!SaveSchemas()) return;
   if (registerMap.dirty || unregisterMap.dirty) {
     for (ScannedFile* file : scanned) {
       if (file->file.isMainSource && (!file->HasBegun() || file->needsWriting)) file->times.translation = 0;
@@ -359,6 +383,7 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
   };
   remove(dependencyFile);
   if (settings.fingerprints) remove(FingerprintPath(dependencyFile));
+  if (!settings.schemaLock.empty()) remove(ProjectSchemas::NotePath(dependencyFile));
   for (const ProjectFile* file : project.files) remove(paths.Translated(*file));
 }
 

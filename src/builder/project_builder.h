@@ -9,6 +9,7 @@
 
 #include "builder/build_files.h"
 #include "builder/project_prints.h"
+#include "builder/project_schemas.h"
 #include "builder/scheduler.h"
 
 namespace qrex {
@@ -41,8 +42,11 @@ class ProjectBuilder : public BuildFiles {
   using Objects = std::unordered_map<std::string, Object>;  // by path
 
   void WriteHeading(std::string_view end) const;
+  const ProjectPrints* Prints() const { return m_prints ? &*m_prints : nullptr; }
   void RunSteps(const ProjectFile* singleFile);
   bool IsAsSaved() const;
+  void CheckSchemas();
+  bool SaveSchemas();
   void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
@@ -63,7 +67,8 @@ class ProjectBuilder : public BuildFiles {
   std::unique_ptr<BuildStep> LinkIfStale();
   std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 
-  std::optional<ProjectPrints> m_prints;  // where the key asks for them
+  std::optional<ProjectPrints> m_prints;    // where the key asks for them
+  std::optional<ProjectSchemas> m_schemas;  // so, too
   uint64_t m_linkPrint = 0;
   std::string m_dependencyFile;
   std::string m_linked;                           // the target, while it is

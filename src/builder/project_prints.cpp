@@ -1,11 +1,13 @@
 #include "builder/project_prints.h"
 
 #include <algorithm>
+#include <unordered_set>
 
 #include "builder/source_command.h"
 #include "builder/staleness.h"
 #include "platform/interpreter.h"
 #include "platform/system.h"
+#include "text/numbers.h"
 #include "text/text_writer.h"
 #include "workspace/switch_blocks.h"
 
@@ -40,6 +42,8 @@ ProjectPrints::ProjectPrints(BuildFiles& builder, const std::string& dependencyF
     : m_builder(builder), m_path(FingerprintPath(dependencyFile)) {
   const ConfigSettings& settings = builder.settings;
   if (!settings.rebuildAll) m_known.Load(builder, m_path);
+  m_keysBefore = m_known.Keys();
+  m_commandBefore = m_known.Command();
   std::string keys = KeysOf(builder.project), command;
   m_keys = PrintMixer().Add(keys).Value();
   if (!settings.translateOnly && !builder.project.exported) {
@@ -92,6 +96,76 @@ uint64_t ProjectPrints::TargetPrint(std::string_view command, const std::vector<
   mixer.Add(command);
   for (const std::string& input : inputs) mixer.Add(input).Add(stampOf(input));
   return mixer.Value();
+}
+
+// --- What differs
+
+bool ProjectPrints::IsOtherSource(ScannedFile& file) const {
+  const FileStamp& noted = m_known.Of(file).source;
+  return noted.time != 0 && noted != StampOf(file.SourcePath());
+}
+
+bool ProjectPrints::IsOtherTranslation(ScannedFile& file) const {
+  const FileStamp& noted = m_known.Of(file).translation.stamp;
+  return noted.time != 0 && noted != TargetStamp(m_builder, file);
+}
+
+// The nearest one, by the path of its source; of other projects nothing is noted here.
+std::string ProjectPrints::OtherInput(ScannedFile& file, bool (ProjectPrints::*isOther)(ScannedFile&) const) const {
+  std::vector<ScannedFile*> open{&file};
+  std::unordered_set<const ScannedFile*> met{&file};
+  for (size_t next = 0; next < open.size(); ++next) {
+    ScannedFile& at = *open[next];
+    if ((this->*isOther)(at)) return at.SourcePath();
+    for (ScannedFile* import : at.imports) {
+      if (met.insert(import).second) open.push_back(import);
+    }
+  }
+  return {};
+}
+
+namespace {
+
+std::vector<std::string> LinesOf(const std::string& text) {
+  std::vector<std::string> lines;
+  SplitString(text, lines, "\n");
+  return lines;
+}
+
+// The first line of one text that the other one lacks; empty where it lacks none.
+std::string LineBeyond(const std::string& text, const std::string& other) {
+  const std::vector<std::string> known = LinesOf(other);
+  for (std::string& line : LinesOf(text)) {
+    if (std::find(known.begin(), known.end(), line) == known.end()) return std::move(line);
+  }
+  return {};
+}
+
+// "it was made with A, now it is B"; empty for equal texts.
+std::string TextDifference(const std::string& before, const std::string& now) {
+  const std::string was = LineBeyond(before, now), is = LineBeyond(now, before);
+  if (was.empty() && is.empty()) return {};
+  return "it was made with " + (was.empty() ? "nothing" : was) + ", now there is " + (is.empty() ? "nothing" : is);
+}
+
+}  // namespace
+
+ProjectPrints::Difference ProjectPrints::OfTranslation(ScannedFile& file) const {
+  const OutputPrint& known = m_known.Of(file).translation;
+  if (known.print == 0) return {{}, "nothing is noted of what it was made from"};
+  if (known.stamp != TargetStamp(m_builder, file)) return {{}, "it is not what was written"};
+  if (std::string source = OtherInput(file, &ProjectPrints::IsOtherSource); !source.empty()) return {source, {}};
+  if (std::string text = TextDifference(m_keysBefore, m_known.Keys()); !text.empty()) return {{}, text};
+  return {{}, "a file of another project that it imports is another one"};
+}
+
+ProjectPrints::Difference ProjectPrints::OfObject(ScannedFile& file, const FileStamp& stamp) const {
+  const OutputPrint& known = m_known.Of(file).object;
+  if (known.print == 0) return {{}, "nothing is noted of what it was made from"};
+  if (known.stamp != stamp) return {{}, "it is not what was made"};
+  if (std::string source = OtherInput(file, &ProjectPrints::IsOtherTranslation); !source.empty()) return {source, {}};
+  if (std::string text = TextDifference(m_commandBefore, m_known.Command()); !text.empty()) return {{}, text};
+  return {{}, "its command, or a translation of another project that it includes, is another one"};
 }
 
 // Imports may have come and gone since files were looked at; their times are those of that look, so that what has

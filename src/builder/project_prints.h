@@ -21,6 +21,14 @@ class ProjectPrints {
   bool DiffersObject(ScannedFile& file, const FileStamp& stamp) const;
   bool Differs(const std::string& output, uint64_t print, const FileStamp& stamp) const;
 
+  // What it is of these two, as far as is known: a file among those that it is made from, by the path of its source,
+  // or else a text.
+  struct Difference {
+    std::string source, text;
+  };
+  Difference OfTranslation(ScannedFile& file) const;
+  Difference OfObject(ScannedFile& file, const FileStamp& stamp) const;
+
   uint64_t ObjectPrint(ScannedFile& file) const;
   uint64_t ResourcePrint(const FileStamp& source) const;
   // Of a link: what its command has beside the inputs, and those.
@@ -35,10 +43,14 @@ class ProjectPrints {
  private:
   uint64_t TranslationPrint(ScannedFile& file) const;
   uint64_t CommandPrint(const ProjectFile& file) const;
+  std::string OtherInput(ScannedFile& file, bool (ProjectPrints::*isOther)(ScannedFile&) const) const;
+  bool IsOtherSource(ScannedFile& file) const;
+  bool IsOtherTranslation(ScannedFile& file) const;
 
   BuildFiles& m_builder;
   const std::string m_path;
   Fingerprints m_known;
+  std::string m_keysBefore, m_commandBefore;  // as they were noted last
   uint64_t m_keys = 0, m_command = 0;
 };
 

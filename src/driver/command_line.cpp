@@ -168,29 +168,35 @@ int CommandLine::RunConfiguration() {
   return 0;
 }
 
-// What is told on the way is of interest where the list cannot be made.
-int CommandLine::RunList() {
-  OpenTrace("stdout", false, false);
-  m_isListing = true;
-  std::string told, list;
-  HoldTrace(&told);
-  const bool isMade = LoadArguments(2) && ListWorkspace(m_settings, list);
-  HoldTrace(nullptr);
-  isMade ? WriteToConsole(list) : WriteHeldToTrace(told);
-  CloseTrace();
-  return isMade ? 0 : 1;
-}
-
-int CommandLine::RunFollow(Follow follow, const std::vector<std::string>& positions) {
+// What is told on the way is of interest where there is no answer.
+template <typename Answer>
+int CommandLine::RunQuietly(Answer answer) {
   OpenTrace("stdout", false, false);
   m_isListing = true;
   std::string told;
   HoldTrace(&told);
-  const bool isDone = LoadArguments(2) && FollowPositions(m_settings, follow, positions);
+  const bool isDone = LoadArguments(2) && answer();
   HoldTrace(nullptr);
   if (!isDone) WriteHeldToTrace(told);
   CloseTrace();
   return isDone ? 0 : 1;
+}
+
+int CommandLine::RunList() {
+  return RunQuietly([this] {
+    std::string list;
+    if (!ListWorkspace(m_settings, list)) return false;
+    WriteToConsole(list);
+    return true;
+  });
+}
+
+int CommandLine::RunFollow(Follow follow, const std::vector<std::string>& positions) {
+  return RunQuietly([&] { return FollowPositions(m_settings, follow, positions); });
+}
+
+int CommandLine::RunQuestion(const Question& question) {
+  return RunQuietly([&] { return AnswerQuestion(m_settings, question); });
 }
 
 namespace {
@@ -203,6 +209,18 @@ int RunWhere(const std::vector<std::string>& arguments, Follow follow) {
     (i > kConfiguration && IsPosition(arguments[i]) ? positions : others).push_back(arguments[i]);
   }
   return CommandLine(others).RunFollow(follow, positions);
+}
+
+int RunAsked(std::vector<std::string> arguments) {
+  const Question question = ReadQuestion(arguments);
+  if (question.problem.empty()) return CommandLine(arguments).RunQuestion(question);
+  std::string usage;
+  for (const CallForm& form : kCallForms) {
+    if (form.option == arguments[1])
+      usage.append("Usage: Qrex ").append(form.option).append(" ").append(form.arguments);
+  }
+  WriteToConsole(question.problem + "\n" + usage + "\n");
+  return 1;
 }
 
 // The arguments behind --init: a name, and perhaps a folder.
@@ -224,6 +242,7 @@ int CommandLine::Dispatch() {
   if (first == "--list") return RunList();
   if (first == "--where") return RunWhere(m_arguments, Follow::Back);
   if (first == "--there") return RunWhere(m_arguments, Follow::Forth);
+  if (first == "--graph" || first == "--why" || first == "--reflect") return RunAsked(m_arguments);
   if (first == "--help") {
     WriteToConsole(HelpText());
     return 0;

@@ -6,6 +6,7 @@
 #include <utility>
 #include <vector>
 
+#include "driver/question.h"
 #include "driver/where.h"
 #include "workspace/config_settings.h"
 
@@ -16,13 +17,16 @@ class CommandLine {
   explicit CommandLine(std::vector<std::string> arguments)
       : m_arguments(std::move(arguments)) {}  // the program's path first
   int Run();                                  // the exit status
-  // The same where positions are to be followed, which the arguments are without.
+  // The same where positions are to be followed, or a question is asked, which the arguments are without.
   int RunFollow(Follow follow, const std::vector<std::string>& positions);
+  int RunQuestion(const Question& question);
 
  private:
   int Dispatch();
   int RunConfiguration();
   int RunList();
+  template <typename Answer>
+  int RunQuietly(Answer answer);
   bool LoadArguments(size_t firstArgument);
   size_t ReadAssignments(size_t index);
   void NoteCall(size_t firstArgument, size_t configIndex);
@@ -37,7 +41,7 @@ class CommandLine {
   std::string m_configPath;
   std::string m_solution;  // as typed, without the leading `*`
   bool m_parallelBuild = false;
-  bool m_isListing = false;  // standard output is for the list alone
+  bool m_isListing = false;  // standard output is for the answer alone
 };
 
 }  // namespace qrex

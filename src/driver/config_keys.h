@@ -29,6 +29,7 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"depfile", &ConfigSettings::depfile, "the file to write what the run read into, as make and ninja read it"},
     {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
     {"buildTrace", &ConfigSettings::buildTrace, "a file for the trace of a build, as trace viewers read it"},
+    {"schemaLock", &ConfigSettings::schemaLock, "a file that records each release of each $schema: none may change"},
     {"report", &ConfigSettings::report, "a file for a page on the build: what ran when, what it cost, and why"},
 };
 

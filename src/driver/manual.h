@@ -28,6 +28,13 @@ inline constexpr CallForm kCallForms[] = {
      "clang-tidy ... | Qrex --where zoo.qrex"},
     {"--there", "[NAME=\"VALUE\" ...] FILE.qrex [LINE ...] [FILE:LINE[:COLUMN] ...]",
      "the other way: to the first generated line that comes of one of a source"},
+    {"--graph",
+     "[NAME=\"VALUE\" ...] FILE.qrex [projects | imports | models] [--of FILE [--depth N]] [--json] [LINE ...]",
+     "what leads to what, as Graphviz reads it; --of shows what FILE leads to and what leads to it"},
+    {"--why", "FILE [NAME=\"VALUE\" ...] FILE.qrex [LINE ...]",
+     "why a build would make the first FILE again, and which imports lead to the cause"},
+    {"--reflect", "[NAME=\"VALUE\" ...] FILE.qrex [--json] [LINE ...]",
+     "lists all declarations, with --json their members and histories: docs/reflect.md has the form"},
     {"--help", "", "this text"},
     {"--version", "", "the release"},
 };

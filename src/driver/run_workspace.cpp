@@ -6,6 +6,7 @@
 #include <vector>
 
 #include "builder/project_builder.h"
+#include "builder/schema_lock.h"
 #include "driver/compile_commands.h"
 #include "driver/depfile.h"
 #include "driver/listing.h"
@@ -39,6 +40,7 @@ class WorkspaceRun {
   explicit WorkspaceRun(ConfigSettings& settings, LoadedTo purpose = LoadedTo::Run)
       : m_settings(settings), m_purpose(purpose), m_workspace(settings) {}
   bool LoadAll();
+  bool ReadSchemas();
   bool Run(ScopeTimer& timer);
   Workspace& Loaded() { return m_workspace; }
   bool IsCompleted() const { return m_isCompleted; }  // else an error has ended it early
@@ -59,11 +61,11 @@ class WorkspaceRun {
   ProjectFile* FindCompileFile(bool& found);
   bool CompileOneFile(ScopeTimer& timer);
   bool ShowGeneratedFile();
-  ProjectConfig* FindProjectConfig(const Project& project) const;
 
   ConfigSettings& m_settings;
   const LoadedTo m_purpose;
   Workspace m_workspace;
+  std::optional<SchemaLock> m_schemas;
   Generator m_generator{m_settings.leftovers};
   ProjectQueue m_queue{m_settings};
   std::unordered_set<std::string> m_prepared;  // directories and marker files that are in place
@@ -137,6 +139,19 @@ bool WorkspaceRun::LoadWorkspaceFile(const std::string& entry) {
   } catch (LexScannerException& exception) {
     MapErrorPosition(file->map, expansion, exception);
     m_settings.macroWorld.messages->Take(ParseErrorOf(m_settings.sourceFiles, exception));
+    return false;
+  }
+}
+
+// With the key schemaLock; only a run that translates keeps it.
+bool WorkspaceRun::ReadSchemas() {
+  const bool translates = m_settings.mode == RunMode::Build || m_settings.mode == RunMode::Compile;
+  if (m_settings.schemaLock.empty() || !translates) return true;
+  try {
+    m_settings.schemas = &m_schemas.emplace(m_settings);
+    return true;
+  } catch (const IException& exception) {
+    m_settings.Tell(ErrorOf(exception));
     return false;
   }
 }
@@ -216,7 +231,7 @@ bool WorkspaceRun::ProcessProject(Project& project) {
   const bool isTranslated = project.usesQrex && (!project.exported || IsLibrary(project.targetType));
   if (isTranslated) return BuildProject(project);
   if (!m_queue.ExportsHeaders(project)) return true;
-  ProjectConfig* config = FindProjectConfig(project);
+  ProjectConfig* config = project.ConfigOfRun();
   if (!config) return false;
   ExportPublicHeaders(project, *config);
   return true;
@@ -285,30 +300,8 @@ void WorkspaceRun::Repackage(const Project& project) const {
   if (IsGccFamily(m_settings.compiler)) copy(GccTargetName(project));
 }
 
-namespace {
-
-std::string KnownConfigs(const Project& project) {
-  if (project.configs.empty()) return project.filePath + " has no config { ... }";
-  std::string text = project.filePath + " has";
-  for (const auto& config : project.configs) text += " " + config->name + "|" + config->platform;
-  return text;
-}
-
-}  // namespace
-
-ProjectConfig* WorkspaceRun::FindProjectConfig(const Project& project) const {
-  ProjectConfig* config = project.FindConfig(m_settings.config, m_settings.platform);
-  if (!config) {
-    const std::string wanted = m_settings.config + "|" + m_settings.platform;
-    m_settings.Tell(
-        Message(Severity::Error, "Error: ", "There is no configuration " + wanted + " in project " + project.name)
-            .WithHint(KnownConfigs(project)));
-  }
-  return config;
-}
-
 bool WorkspaceRun::BuildProject(Project& project) {
-  ProjectConfig* config = FindProjectConfig(project);
+  ProjectConfig* config = project.ConfigOfRun();
   if (!config) return false;
   return m_settings.mode == RunMode::Clean ? m_queue.Clean(project, *config) : m_queue.Build(project, *config);
 }
@@ -350,7 +343,7 @@ bool WorkspaceRun::CompileOneFile(ScopeTimer& timer) {
   if (file->kind != FileKind::C && file->kind != FileKind::Cpp && file->kind != FileKind::Asm) {
     return abort("not a cpp, c or asm file");
   }
-  ProjectConfig* config = FindProjectConfig(project);
+  ProjectConfig* config = project.ConfigOfRun();
   if (!config) return false;
   DeleteReporting(BuildPaths(project, *config).Translated(*file));
   if (!m_queue.Compile(project, *config, *file)) return false;
@@ -369,7 +362,7 @@ bool WorkspaceRun::ShowGeneratedFile() {
     TraceWriter() << "File is not part of an qrex project\n";
     return false;
   }
-  const ProjectConfig* config = FindProjectConfig(*file->project);
+  const ProjectConfig* config = file->project->ConfigOfRun();
   if (!config) return false;
   TraceWriter() << "\n" << PathJoin(TranslationDirectory(*config), file->path) << "(1)\n";
   return true;
@@ -455,7 +448,7 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (loaded) *loaded = run;
   RunObservers observers(settings);
   observers.Expect(run->Loaded());
-  const bool succeeded = run->LoadAll() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
+  const bool succeeded = run->LoadAll() && run->ReadSchemas() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
   return observers.End(run->IsCompleted()) && succeeded;
 }
 
@@ -465,6 +458,21 @@ bool ListWorkspace(ConfigSettings& settings, std::string& list) {
   if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
   list = ListingOf(run.Loaded());
   return true;
+}
+
+bool AnswerQuestion(ConfigSettings& settings, const Question& question) {
+  if (!CheckPathSyntax(settings)) return false;
+  WorkspaceRun run(settings, LoadedTo::Ask);
+  if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
+  run.Loaded().SortProjects();
+  std::optional<std::string> answer;
+  try {
+    answer = AnswerTo(question, run.Loaded());
+  } catch (const IException& exception) {
+    settings.Tell(ErrorOf(exception));
+  }
+  if (answer) WriteToConsole(*answer);
+  return answer.has_value();
 }
 
 bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions) {

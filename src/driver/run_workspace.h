@@ -5,6 +5,7 @@
 #include <string>
 #include <vector>
 
+#include "driver/question.h"
 #include "driver/where.h"
 #include "workspace/config_settings.h"
 
@@ -23,6 +24,10 @@ bool ListWorkspace(ConfigSettings& settings, std::string& list);
 // Loads the same, and follows these positions, or those in the lines of standard input where there are none. False,
 // with a message, where something cannot be loaded or a position is none that is known.
 bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<std::string>& positions);
+
+// Loads the same, and answers the question on standard output. False, with messages, where something cannot be loaded
+// or translated, or the question is about nothing that is there.
+bool AnswerQuestion(ConfigSettings& settings, const Question& question);
 
 // The deepest directory of the path that holds the marker, and the path relative to it.
 bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative);

@@ -1,5 +1,7 @@
 #include "report/json_writer.h"
 
+#include <charconv>
+
 #include "platform/console.h"
 
 namespace qrex {
@@ -20,6 +22,14 @@ JsonWriter& JsonWriter::Value(std::string_view text) {
     }
   }
   m_text += '"';
+  return *this;
+}
+
+JsonWriter& JsonWriter::Value(double number) {
+  char digits[32];
+  const auto end = std::to_chars(digits, digits + sizeof digits, number).ptr;
+  Separate();
+  m_text.append(digits, end);
   return *this;
 }
 

@@ -34,6 +34,7 @@ class JsonWriter {
     m_text += std::to_string(number);
     return *this;
   }
+  JsonWriter& Value(double number);  // a finite one, in as many digits as bring it back
   JsonWriter& Value(bool value) {
     Separate();
     m_text += value ? "true" : "false";

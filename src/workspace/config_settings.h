@@ -20,6 +20,7 @@ namespace qrex {
 
 struct Project;
 class BuildObserver;  // builder/build_observer.h
+class SchemaLock;     // builder/schema_lock.h
 
 enum class RunMode { Clean, Compile, Build, Gen, Show };
 enum class RuntimeChoice { None, Source, Built };
@@ -86,6 +87,8 @@ struct ConfigSettings {
   bool hasToldOfLongCommand = false;
   std::unordered_set<std::string> faulty;     // sources with an error, which has been told
   std::unordered_set<const Project*> unmade;  // whose target could not be made
+  std::string schemaLock;                     // the file of recorded releases; empty: none is kept
+  SchemaLock* schemas = nullptr;              // as it is read in this run, not owned; null: none is kept
   BuildObserver* observer = nullptr;          // of the build, not owned; null: nobody looks
   bool coloursToolMessages = false;           // where a terminal shows them
 

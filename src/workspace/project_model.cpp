@@ -84,6 +84,27 @@ ProjectConfig* Project::FindConfig(const std::string& configName, const std::str
   return nullptr;
 }
 
+namespace {
+
+std::string KnownConfigs(const Project& project) {
+  if (project.configs.empty()) return project.filePath + " has no config { ... }";
+  std::string text = project.filePath + " has";
+  for (const auto& config : project.configs) text += " " + config->name + "|" + config->platform;
+  return text;
+}
+
+}  // namespace
+
+ProjectConfig* Project::ConfigOfRun() const {
+  ProjectConfig* const config = FindConfig(settings->config, settings->platform);
+  if (!config) {
+    const std::string wanted = settings->config + "|" + settings->platform;
+    settings->Tell(Message(Severity::Error, "Error: ", "There is no configuration " + wanted + " in project " + name)
+                       .WithHint(KnownConfigs(*this)));
+  }
+  return config;
+}
+
 std::string Project::SourcePath(const ProjectFile& file) const { return PathJoin(rootDir, file.path); }
 
 std::string Project::ListingHint(const ProjectFile& file) const {

@@ -95,6 +95,7 @@ struct Project {
   bool AddSubproject(const std::string& path);  // false, with a warning line, when it was there already
   const std::string& MangledProjDir();          // rootToProjDir with `/` as `_`
   ProjectConfig* FindConfig(const std::string& name, const std::string& platform) const;  // or null
+  ProjectConfig* ConfigOfRun() const;                                                     // null, with an error told
   std::string SourcePath(const ProjectFile& file) const;   // rootDir joined with the file's path
   std::string ListingHint(const ProjectFile& file) const;  // for a file that is missing: where it is listed
 

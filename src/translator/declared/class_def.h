@@ -107,6 +107,7 @@ class ClassDef : public RecordedElement, public TypeBehaviour {
   int64_t m_firstRsn = -1;
   int64_t m_numModelSchema = 0;  // 0: no model; a model without $schema counts 1
   std::vector<std::unique_ptr<ModelField>> m_currentThenDroppedModelFields;
+  const char* m_schemaPosition = nullptr;  // of `$schema` in the source text; null without one
   size_t m_numCurrentModelFields = 0;
   std::vector<ModelField*> m_modelFields;  // in the order of their addition: the serialised order
   std::vector<InterfaceDef*> m_interfaces;

@@ -46,6 +46,10 @@ void CheckTargetRelease(QrexParser& parser) {
   const LexToken number = NextToken(scanner);
   if (number.kind != kDecimal) return;
   const int64_t release = static_cast<int64_t>(IntegerValue(number, scanner.dialect));
+  TranslationHost& host = parser.file.host;
+  if (host.KeepsSchemas()) {
+    return host.DefinesTarget(parser.file, release, parser.stream.SourcePosition(number.text.begin));
+  }
   const ClassDef* latest = nullptr;
   for (const ScannedFile* file : parser.file.host.FilesOfProject()) {
     if (file->rootNameSpace) latest = LatestModel(*file->rootNameSpace, latest);

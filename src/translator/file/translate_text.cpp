@@ -9,6 +9,7 @@
 #include "translator/file/keywords.h"
 #include "translator/file/predefined_variables.h"
 #include "translator/file/release_check.h"
+#include "translator/file/schema_check.h"
 #include "translator/file/tails.h"
 #include "translator/reader/line_directives.h"
 #include "translator/reader/qrex_parser.h"
@@ -48,7 +49,9 @@ void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expan
   {
     QrexParser parser(file, stream, out, expanded, AllKeywords());
     parser.Translate();
-    if (kind == FileKind::Cpp && parser.WantsCompilableText()) CheckTargetRelease(parser);
+    CheckSchemas(file);
+    const bool asksForTarget = parser.WantsCompilableText() || file.host.KeepsSchemas();
+    if (kind == FileKind::Cpp && asksForTarget) CheckTargetRelease(parser);
   }
   out.Flush();
   const char* const last = stream.SourcePosition();

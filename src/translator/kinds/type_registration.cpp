@@ -27,7 +27,9 @@ void ParseType(QrexParser& parser) {
   const Project& project = parser.GetProject();
   const std::string api =
       registered && project.targetType == TargetType::DynamicLinkLibrary ? project.name + "_API " : std::string();
-  if (registered) parser.file.registrations.types.push_back({parsed->type, &parser.Current(), parser.SourcePosition()});
+  if (registered) {
+    parser.file.registrations.types.push_back({parsed->type, &parser.Current(), parser.stream.SourcePosition(begin)});
+  }
   Write(parser.out, R"(
     $api$vesk::ReflectionByteCode _GetReflected($type$ const*);
     $api$vesk::TypeOps const& _GetTypeOps($type$ const*);

@@ -159,6 +159,7 @@ void ModelBlock::ParseDropped() {
 // --- $schema
 
 void ModelBlock::ParseSchema() {
+  m_def.m_schemaPosition = m_parser.stream.SourcePosition(m_parser.current.text.begin);
   m_parser.Advance();
   m_parser.Expect(kOpenBrace, "{");
   for (int64_t previous = -1; !m_parser.Is(kCloseBrace);) {

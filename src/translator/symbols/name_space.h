@@ -156,6 +156,7 @@ class NameSpace : public NameSpaceElement {
   bool isInline = false;     // known of C++ of today alone
   bool Empty() const { return m_elements.empty(); }
   const std::map<std::string, std::unique_ptr<NameSpaceElement>, std::less<>>& Elements() const { return m_elements; }
+  const std::vector<std::unique_ptr<NameSpaceElement>>& Replaced() const { return m_replaced; }
 
  private:
   const Symbol* FindSymbol(std::string_view name) const;  // or null

@@ -17,6 +17,7 @@
 namespace qrex {
 
 class ScannedFile;
+class ClassDef;
 
 // The qualified names that each .cpp file registers, by path.
 struct DeclarationRegistry {
@@ -55,6 +56,11 @@ class TranslationHost {
   // Around the translation of a file, which has those of its imports within it.
   virtual void TranslationBegins(const ScannedFile&) {}
   virtual void TranslationEnds(const ScannedFile&) {}
+  // With the key schemaLock: what of a model, whose file is translated, goes against what is recorded of it, empty for
+  // nothing; and with which release a source defines the target of its project, at a position in its text.
+  virtual bool KeepsSchemas() const { return false; }
+  virtual std::string SchemaFault(const ClassDef&) { return {}; }
+  virtual void DefinesTarget(const ScannedFile&, int64_t /*release*/, const char* /*position*/) {}
   // In the scanned file whose source text holds the position; false when none does.
   virtual bool FindSourcePlace(const char* position, SourcePlace& place) const = 0;
 };
@@ -62,7 +68,7 @@ class TranslationHost {
 struct TypeRegistration {
   std::string code;                  // the type code
   const NameSpace* scope = nullptr;  // the name space of the declaration
-  const char* position = nullptr;    // in the source
+  const char* position = nullptr;    // in the source text
 };
 
 // Whether this .cpp may hold the reflection tail of an imported file: it is of the same project, and no other .cpp
