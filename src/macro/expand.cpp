@@ -172,6 +172,7 @@ void ExpansionContext::ExpandIdentifier(const LexToken& token) {
   LSVariable* variable = m_frame.Find(token.text.View(), token.text.begin);
   if (!variable) return;
   FlushTo(m_here);
+  if (m_sink.NotesCalls()) return CallAndNote(*variable);
   CallVariable(*variable);
 }
 

@@ -135,6 +135,7 @@ class ExpansionContext {
     bool isPlain;
   };
   void CallVariable(LSVariable& variable);
+  void CallAndNote(LSVariable& variable);
   void CallMacro(const LSMacroVariable& macro);
   void CallFunctionArgument(const LSMacroVariable& macro);
   using BoundArguments = boost::container::small_vector<BoundArgument, 6>;

@@ -36,8 +36,12 @@ std::shared_ptr<const BodyWords> LSMacroVariable::WordsOfBody(const NamesInUse& 
   return m_words->isComplete ? m_words : nullptr;
 }
 
-void ExpansionContext::CallVariable(LSVariable& variable) {
+void ExpansionContext::CallAndNote(LSVariable& variable) {
   const NotedCall noted(m_sink, AnchorForTemporary()->begin);
+  CallVariable(variable);
+}
+
+void ExpansionContext::CallVariable(LSVariable& variable) {
   if (variable.Kind() != VarType::Macro) {
     DropToScanner();
     return EmitGenerated(variable.ValueText());

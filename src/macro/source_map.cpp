@@ -192,15 +192,15 @@ void ExpansionSink::WriteGenerated(std::string_view text, const char* source, Li
   map.AddGenerated(source, output.size() - before);
 }
 
-void NotedCall::Begin(const char* source) {
-  m_sink->isInCall = true;
-  m_call = {static_cast<int64_t>(m_sink->output.size()), 0, source};
+NotedCall::NotedCall(ExpansionSink& sink, const char* source)
+    : m_sink(sink), m_call{static_cast<int64_t>(sink.output.size()), 0, source} {
+  m_sink.isInCall = true;
 }
 
-void NotedCall::End() {
-  m_sink->isInCall = false;
-  m_call.end = static_cast<int64_t>(m_sink->output.size());
-  if (m_call.end > m_call.begin) m_sink->map.calls->push_back(m_call);
+NotedCall::~NotedCall() {
+  m_sink.isInCall = false;
+  m_call.end = static_cast<int64_t>(m_sink.output.size());
+  if (m_call.end > m_call.begin) m_sink.map.calls->push_back(m_call);
 }
 
 size_t LineIndent::ColumnsIn(std::string_view output) const {

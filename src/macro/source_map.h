@@ -124,12 +124,13 @@ class ExpansionSink {
   // Of the text and its map: short runs take more than what they stand for.
   size_t Bytes() const { return output.size() + map.Bytes(); }
   LineIndent ColumnHere() const { return LineIndent::AtOffset(output.size()); }
+  bool NotesCalls() const { return map.calls && !isInCall; }
 
   std::string output;
   SourceMap map;
   size_t expectedSize = 0;  // the room to make once there is something to write
   size_t bytesOutside = 0;  // of the expansions that wait for this one
-  bool isInCall = false;    // asked where the map keeps the calls
+  bool isInCall = false;    // that is noted
 
  private:
   void MakeRoom();
@@ -138,23 +139,17 @@ class ExpansionSink {
   void WriteIndented(const TextRange& range, LineIndent indent);
 };
 
-// Around a call of a macro: notes what it gave, where the map keeps that.
+// Around a call of a macro that is noted: what it gave.
 class NotedCall {
  public:
-  NotedCall(ExpansionSink& sink, const char* source) : m_sink(sink.map.calls && !sink.isInCall ? &sink : nullptr) {
-    if (m_sink) Begin(source);
-  }
-  ~NotedCall() {
-    if (m_sink) End();
-  }
+  NotedCall(ExpansionSink& sink, const char* source);
+  ~NotedCall();
   NotedCall(const NotedCall&) = delete;
   NotedCall& operator=(const NotedCall&) = delete;
 
  private:
-  void Begin(const char* source);
-  void End();
-  ExpansionSink* const m_sink;
-  SourceMap::Call m_call{};
+  ExpansionSink& m_sink;
+  SourceMap::Call m_call;
 };
 
 }  // namespace qrex

@@ -64,11 +64,13 @@ void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expan
     WriteProjectRegistration(file, file.host.RegisterMap(), out);
     WriteProjectRegistration(file, file.host.UnregisterMap(), out);
   }
+  constexpr char kGuardEnd[] = "\n#endif // include guard\n";
+  if (kind == FileKind::H && !directives) out << kGuardEnd;
   out.Flush();
-  if (directives) directives->Finish();
-  TextWriter behind(target);
-  TextWriter& foot = directives ? behind : out;  // which came of no line
-  if (kind == FileKind::H) foot << "\n#endif // include guard\n";
+  if (!directives) return;
+  directives->Finish();
+  TextWriter foot(target);  // which came of no line
+  if (kind == FileKind::H) foot << kGuardEnd;
   foot.Flush();
 }
 
