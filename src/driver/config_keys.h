@@ -29,7 +29,7 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"depfile", &ConfigSettings::depfile, "the file to write what the run read into, as make and ninja read it"},
     {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
     {"buildTrace", &ConfigSettings::buildTrace, "a file for the trace of a build, as trace viewers read it"},
-    {"report", &ConfigSettings::report, "a file for a page on the build: what ran when, what it cost, and why"},
+    {"report", &ConfigSettings::report, "a file for a page: what ran when, what it cost, and why; models, imports"},
 };
 
 inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
