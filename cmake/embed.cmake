@@ -10,6 +10,6 @@ endfunction()
 
 set(constants "")
 embed(kPageHtml page.html)
-embed(kPageStyle page.css)
-embed(kPageScript page_model.js page_timeline.js page_tabs.js)
+embed(kPageStyle page.css page_workspace.css)
+embed(kPageScript page_model.js page_timeline.js page_table.js page_workspace.js page_models.js page_imports.js page_tabs.js)
 file(WRITE ${OUTPUT} "#include \"report/page_parts.h\"\n\nnamespace qrex {\n\n${constants}\n}  // namespace qrex\n")

@@ -242,7 +242,9 @@ int CommandLine::Dispatch() {
   if (first == "--list") return RunList();
   if (first == "--where") return RunWhere(m_arguments, Follow::Back);
   if (first == "--there") return RunWhere(m_arguments, Follow::Forth);
-  if (first == "--graph" || first == "--why" || first == "--reflect") return RunAsked(m_arguments);
+  for (const std::string_view question : {"--graph", "--why", "--reflect", "--report"}) {
+    if (first == question) return RunAsked(m_arguments);
+  }
   if (first == "--help") {
     WriteToConsole(HelpText());
     return 0;

@@ -30,7 +30,7 @@ inline constexpr ConfigKey<std::string ConfigSettings::*> kStringKeys[] = {
     {"windowsSdk", &ConfigSettings::windowsSdk, "the version beside it, empty: the newest 10.0"},
     {"buildTrace", &ConfigSettings::buildTrace, "a file for the trace of a build, as trace viewers read it"},
     {"schemaLock", &ConfigSettings::schemaLock, "a file that records each release of each $schema: none may change"},
-    {"report", &ConfigSettings::report, "a file for a page on the build: what ran when, what it cost, and why"},
+    {"report", &ConfigSettings::report, "a file for a page: what ran when, what it cost, and why; models, imports"},
 };
 
 inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {

@@ -35,6 +35,8 @@ inline constexpr CallForm kCallForms[] = {
      "why a build would make the first FILE again, and which imports lead to the cause"},
     {"--reflect", "[NAME=\"VALUE\" ...] FILE.qrex [--json] [LINE ...]",
      "lists all declarations, with --json their members and histories: docs/reflect.md has the form"},
+    {"--report", "[NAME=\"VALUE\" ...] FILE.qrex PAGE.html [LINE ...]",
+     "writes a page on the models, their histories and the imports of a workspace, without building it"},
     {"--help", "", "this text"},
     {"--version", "", "the release"},
 };

@@ -2,10 +2,9 @@
 
 #include <algorithm>
 
+#include "driver/report_page.h"
 #include "platform/console.h"
 #include "report/trace_file.h"
-#include "text/files.h"
-#include "text/version.h"
 
 namespace qrex {
 
@@ -69,19 +68,13 @@ RunObservers::RunObservers(ConfigSettings& settings)
   settings.observer = m_all.get();
 }
 
-RunObservers::~RunObservers() { End(false); }
+RunObservers::~RunObservers() { End(false, nullptr); }
 
 void RunObservers::Expect(const Workspace& workspace) {
   if (m_progress) m_progress->Expect(workspace);
 }
 
-PageHeading RunObservers::Heading(bool completed) const {
-  std::string names;
-  for (const std::string& name : m_settings.workspaces) names += (names.empty() ? "" : ", ") + name;
-  return {names, m_settings.config + " | " + m_settings.platform + " | Qrex " + std::string(Version()), completed};
-}
-
-bool RunObservers::End(bool completed) {
+bool RunObservers::End(bool completed, Workspace* loaded) {
   if (std::exchange(m_hasEnded, true)) return true;
   m_settings.observer = nullptr;
   m_settings.macroWorld.messages = m_messagesBefore;
@@ -89,23 +82,12 @@ bool RunObservers::End(bool completed) {
   if (!m_record) return true;
   m_record->End();
   bool isWritten = true;
-  if (!m_settings.buildTrace.empty()) isWritten = Write(m_settings.buildTrace, TraceText(*m_record));
+  if (!m_settings.buildTrace.empty()) isWritten = WriteReport(m_settings, m_settings.buildTrace, TraceText(*m_record));
   if (!m_settings.report.empty()) {
-    isWritten = Write(m_settings.report, PageText(*m_record, Heading(completed))) && isWritten;
+    isWritten =
+        WriteReport(m_settings, m_settings.report, BuildPage(m_settings, *m_record, completed, loaded)) && isWritten;
   }
   return isWritten;
-}
-
-bool RunObservers::Write(const std::string& path, const std::string& text) const {
-  try {
-    CreateDirectories(path, false);
-    m_settings.leftovers.Beside(path);
-    ReplaceFile(path, text);
-    return true;
-  } catch (const IException& exception) {
-    m_settings.Tell(Message(Severity::Error, "Error: ", ExceptionText(exception)));
-    return false;
-  }
 }
 
 }  // namespace qrex

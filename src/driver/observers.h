@@ -20,14 +20,12 @@ class RunObservers {
   RunObservers& operator=(const RunObservers&) = delete;
 
   void Expect(const Workspace& workspace);
-  // Writes what the settings ask for. False: a file could not be written, and a message has told.
-  bool End(bool completed);
+  // Writes what the settings ask for, the page with what is declared in `loaded`, unless null. False: a file could not
+  // be written, and a message has told.
+  bool End(bool completed, Workspace* loaded);
 
  private:
   class ToAll;
-  PageHeading Heading(bool completed) const;
-  bool Write(const std::string& path, const std::string& text) const;
-
   ConfigSettings& m_settings;
   MessageConsumer* const m_messagesBefore;
   std::unique_ptr<Progress> m_progress;

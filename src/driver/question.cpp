@@ -24,11 +24,13 @@ class QuestionReader {
     const std::string& option = m_arguments[kFirst - 1];
     if (option == "--why") m_question.about = Question::About::Why;
     if (option == "--reflect") m_question.about = Question::About::Declarations;
+    if (option == "--report") m_question.about = Question::About::Page;
     const bool isWhy = m_question.about == Question::About::Why;
     if (isWhy) Take(kFirst, "FILE", m_question.file);
     for (size_t i = kFirst; i < m_arguments.size() && m_question.problem.empty();) {
       if (!ReadOption(i) && !ReadGraph(i)) ++i;
     }
+    if (m_question.about == Question::About::Page) Take(BehindConfiguration(), "PAGE.html", m_question.file);
     if (m_question.depth >= 0 && m_question.file.empty()) Fail("--depth goes with --of FILE");
     if (!platform::IsValidUtf8(m_question.file)) Fail("No valid UTF-8 in " + m_question.file);
     return m_question;
@@ -51,7 +53,8 @@ class QuestionReader {
     const bool isGraph = m_question.about == Question::About::Graph;
     if (!word.starts_with("--")) return false;
     Remove(index);
-    if (word == "--json" && m_question.about != Question::About::Why) {
+    const bool hasForms = isGraph || m_question.about == Question::About::Declarations;
+    if (word == "--json" && hasForms) {
       m_question.asJson = true;
     } else if (word == "--of" && isGraph) {
       Take(index, "FILE behind --of", m_question.file);
@@ -66,13 +69,18 @@ class QuestionReader {
     return true;
   }
 
+  size_t BehindConfiguration() const {
+    const auto isPath = [](const std::string& argument) { return argument.find('=') == argument.npos; };
+    const auto path = std::find_if(m_arguments.begin() + kFirst, m_arguments.end(), isPath);
+    return static_cast<size_t>(path - m_arguments.begin()) + 1;
+  }
+
   // Behind the configuration; a line of it is never such a word.
   bool ReadGraph(size_t index) {
     if (m_question.about != Question::About::Graph) return false;
-    const auto begin = m_arguments.begin() + kFirst, here = m_arguments.begin() + static_cast<ptrdiff_t>(index);
-    const bool isBehind = std::any_of(begin, here, [](const std::string& a) { return a.find('=') == a.npos; });
-    if (!isBehind || std::find(kGraphs.begin(), kGraphs.end(), *here) == kGraphs.end()) return false;
-    m_question.graph = *here;
+    const std::string& word = m_arguments[index];
+    if (index < BehindConfiguration() || std::find(kGraphs.begin(), kGraphs.end(), word) == kGraphs.end()) return false;
+    m_question.graph = word;
     Remove(index);
     return true;
   }

@@ -1,4 +1,5 @@
-// `Qrex --graph`, `--why` and `--reflect`: what is asked, and the text that answers.
+// `Qrex --graph`, `--why`, `--reflect` and `--report`: what is asked, and the text that answers, but of a page, which
+// driver/report_page.h writes.
 #pragma once
 
 #include <optional>
@@ -10,10 +11,10 @@
 namespace qrex {
 
 struct Question {
-  enum class About { Graph, Why, Declarations };
+  enum class About { Graph, Why, Declarations, Page };
   About about = About::Graph;
   std::string graph = "projects";
-  std::string file;    // that --why, or --of, is about; empty: everything
+  std::string file;    // that --why, or --of, is about, empty: everything; of a page, where it goes
   int64_t depth = -1;  // of --of; negative: without end
   bool asJson = false;
   std::string problem;  // of the arguments; empty: they can be understood

@@ -12,6 +12,7 @@
 #include "driver/listing.h"
 #include "driver/observers.h"
 #include "driver/project_queue.h"
+#include "driver/report_page.h"
 #include "driver/run_hints.h"
 #include "generators/common.h"
 #include "generators/exported_project.h"
@@ -448,8 +449,9 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   if (loaded) *loaded = run;
   RunObservers observers(settings);
   observers.Expect(run->Loaded());
-  const bool succeeded = run->LoadAll() && run->ReadSchemas() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
-  return observers.End(run->IsCompleted()) && succeeded;
+  const bool isLoaded = run->LoadAll();
+  const bool succeeded = isLoaded && run->ReadSchemas() && WriteCompileCommands(run->Loaded()) && run->Run(timer);
+  return observers.End(run->IsCompleted(), isLoaded ? &run->Loaded() : nullptr) && succeeded;
 }
 
 bool ListWorkspace(ConfigSettings& settings, std::string& list) {
@@ -465,6 +467,7 @@ bool AnswerQuestion(ConfigSettings& settings, const Question& question) {
   WorkspaceRun run(settings, LoadedTo::Ask);
   if (!run.LoadAll() || !IsWholeWorkspace(run.Loaded())) return false;
   run.Loaded().SortProjects();
+  if (question.about == Question::About::Page) return WriteWorkspacePage(run.Loaded(), question.file);
   std::optional<std::string> answer;
   try {
     answer = AnswerTo(question, run.Loaded());

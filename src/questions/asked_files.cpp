@@ -2,11 +2,13 @@
 
 #include "text/files.h"
 #include "text/paths.h"
+#include "text/trace.h"
 #include "translator/file/translate_file.h"
 
 namespace qrex {
 
 bool AskedFiles::Translate() {
+  const QuietConsole quiet;
   bool isDone = true;
   for (const auto& project : m_workspace.projects) {
     if (!IsTranslated(*project)) continue;
@@ -30,6 +32,7 @@ bool AskedFiles::Translate(Project& project) {
       BringUpToDate(scanned);
       m_files.push_back(&scanned);
     } catch (const FaultyFileException&) {
+      m_faulty.push_back(&scanned);
       isDone = false;  // it has been told
     } catch (const IException& exception) {
       files.settings.Tell(ErrorOf(exception));

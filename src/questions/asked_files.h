@@ -16,17 +16,20 @@ class AskedFiles {
  public:
   explicit AskedFiles(Workspace& workspace) : m_workspace(workspace) {}
 
-  // All that a build would translate. False, with messages told, where one of them has an error.
+  // All that a build would translate; what @print and the like write on the way is dropped. False, with messages told,
+  // where one of them has an error.
   bool Translate();
   // The translated ones, each once: projects in the order of the build, and the files of each in theirs.
   const std::vector<ScannedFile*>& Files() const { return m_files; }
+  // Those with an error, or with an import that has one: what they declare and import is not known.
+  const std::vector<ScannedFile*>& FaultyFiles() const { return m_faulty; }
 
  private:
   bool Translate(Project& project);
 
   Workspace& m_workspace;
   std::vector<std::unique_ptr<BuildFiles>> m_projects;
-  std::vector<ScannedFile*> m_files;
+  std::vector<ScannedFile*> m_files, m_faulty;
 };
 
 // The file that a user means: by its path in the tree, by that of its source or of its translation, from the folder of

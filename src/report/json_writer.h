@@ -44,6 +44,11 @@ class JsonWriter {
   JsonWriter& Member(std::string_view name, const T& value) {
     return Key(name).Value(value);
   }
+  JsonWriter& Json(std::string_view text) {  // a value that is written already
+    Separate();
+    m_text += text;
+    return *this;
+  }
   JsonWriter& Line() {  // of the text; ahead of a value
     Separate();
     m_text += '\n';

@@ -74,7 +74,7 @@ class Page {
  public:
   Page(const BuildRecord& record, const PageHeading& heading) : m_record(record), m_heading(heading) {}
 
-  std::string Data() {
+  std::string Data(std::string_view workspace) {
     for (const auto& [path, file] : m_record.files) m_pathOfSource[file.sourcePath] = path;
     m_json.Open('{').Member("title", m_heading.title).Member("subtitle", m_heading.subtitle);
     m_json.Member("began", Milliseconds(m_record.begin))
@@ -87,7 +87,9 @@ class Page {
     WriteMessages();
     m_json.Key("projects").Open('[');
     for (const std::string& name : m_projects.All()) m_json.Value(name);
-    m_json.Close(']').Close('}');
+    m_json.Close(']').Member("built", m_heading.built);
+    if (!workspace.empty()) m_json.Key("workspace").Json(workspace);
+    m_json.Close('}');
     return m_json.Text();
   }
 
@@ -204,10 +206,10 @@ void Page::WriteMessages() {
 
 }  // namespace
 
-std::string PageText(const BuildRecord& record, const PageHeading& heading) {
+std::string PageText(const BuildRecord& record, const PageHeading& heading, std::string_view workspace) {
   std::string page;
   std::string_view rest = kPageHtml;
-  const std::string data = Page(record, heading).Data();
+  const std::string data = Page(record, heading).Data(workspace);
   for (const auto& [mark, text] : {std::pair<std::string_view, std::string_view>("/*style*/", kPageStyle),
                                    {"/*data*/", data},
                                    {"/*script*/", kPageScript}}) {

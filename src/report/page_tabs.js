@@ -1,47 +1,5 @@
 // The tabs: each is a row of `tabs`, made when it is first shown. What is shown stands in the address behind the #: a tab,
-// and behind a slash the file that filters the timeline; so the way back works.
-
-const MOST_ROWS = 200;
-
-// A table that can be sorted and searched. Columns: {title, value(row) to sort by, cell(row), numeric, rising, wide}: numbers
-// begin with the largest unless they rise; a wide column is left out where there is little room.
-function makeTable(label, rows, columns, sortedBy, textOf) {
-  const falls = (column) => column.numeric === true && !column.rising;
-  let order = sortedBy, descending = falls(columns[sortedBy]), all = false, words = "";
-  const body = make("tbody"), status = make("p", {class: "status", "aria-live": "polite"});
-  const heads = columns.map((column, index) => make("th", {scope: "col", class: classOf(column)},
-    make("button", {type: "button", onclick: () => sortBy(index)}, column.title)));
-  const more = make("button", {type: "button", class: "more", onclick: () => { all = true; fill(); }});
-
-  function classOf(column) {
-    return [column.numeric && "number", column.wide && "wide"].filter(Boolean).join(" ") || null;
-  }
-  function sortBy(index) {
-    descending = index === order ? !descending : falls(columns[index]);
-    order = index;
-    fill();
-  }
-  function fill() {
-    const {value} = columns[order], sign = descending ? -1 : 1;
-    const found = rows.filter((row) => textOf(row).toLowerCase().includes(words));
-    const compare = (a, b) => (a < b ? -1 : a > b ? 1 : 0);
-    found.sort((a, b) => sign * compare(value(a), value(b)) || compare(textOf(a), textOf(b)));
-    const shown = all ? found : found.slice(0, MOST_ROWS);
-    body.replaceChildren(...shown.map((row) => make("tr", {}, columns.map((column, index) =>
-      make(index === 0 ? "th" : "td", {class: classOf(column), scope: index === 0 ? "row" : null}, column.cell(row))))));
-    heads.forEach((head, index) =>
-      head.setAttribute("aria-sort", index !== order ? "none" : descending ? "descending" : "ascending"));
-    status.textContent = words ? `${found.length} of ${rows.length} found` : "";
-    more.hidden = shown.length === found.length;
-    more.textContent = `Show all ${found.length.toLocaleString("en")}`;
-  }
-  const search = make("input", {type: "search", placeholder: "Search", "aria-label": `Search in ${label}`,
-    oninput: (event) => { words = event.target.value.toLowerCase(); fill(); }});
-  fill();
-  return make("div", {class: "table"}, [
-    rows.length > 10 ? make("div", {class: "search"}, [search, status]) : null,
-    make("table", {}, [make("caption", {}, label), make("thead", {}, make("tr", {}, heads)), body]), more]);
-}
+// and behind a slash what it is about, as the file that filters the timeline; so the way back works.
 
 function timeCell(time, most) {
   const share = most > 0 ? Math.round(100 * time / most) : 0;
@@ -51,10 +9,6 @@ function timeCell(time, most) {
 function fileCell(row, note) {
   return [fileLink(row.file), row.failed ? make("strong", {class: "bad"}, " failed") : null,
     note ? make("span", {class: "note"}, note) : null];
-}
-
-function empty(text) {
-  return make("p", {class: "empty"}, text);
 }
 
 // --- The tabs
@@ -106,7 +60,7 @@ function causesTable(files) {
   ], 2, (row) => row.why.text)]);
 }
 
-const tabs = [
+const buildTabs = [
   {id: "timeline", title: "Timeline", show: (path) => { if (spans.length) showTimeline(path); },
     make: () => (spans.length ? [timeline.element, under] : [empty("Nothing was stale: no step was run.")])},
   {id: "files", title: "Files", make: () => {
@@ -144,6 +98,9 @@ const tabs = [
     return [list, more];
   }},
 ];
+const tabs = [...(data.built ? buildTabs : []),
+  {id: "models", title: "Models", ...modelViews}, {id: "history", title: "History", ...historyViews},
+  {id: "imports", title: "Imports", ...importViews}];
 
 function sortedMessages() {  // errors ahead, else as they came
   return [...data.messages].sort((a, b) => (a.severity === b.severity ? 0 : a.severity === "error" ? -1 : 1));
@@ -166,22 +123,37 @@ function messageItem(message) {
 
 // --- The frame
 
-function showFigures() {
+function buildFigures() {
   const tools = spans.filter((span) => span.group !== "translation");
   const compiled = tools.filter((span) => span.group === "compiler");
   const path = sumOf(data.critical, (index) => spans[index].time);
   const translation = sumOf(spans.filter((span) => span.group === "translation"), (span) => span.time - span.inner);
-  const figures = [["Time", duration(data.total)], ["Critical path", duration(path)], ["Translation", duration(translation)],
+  return [["Time", duration(data.total)], ["Critical path", duration(path)], ["Translation", duration(translation)],
     ["Compiler time", duration(sumOf(compiled, (span) => span.time))], ["Objects", compiled.length.toLocaleString("en")],
     ["Slots", String(data.slots - 1)], ["Errors", String(data.errors), data.errors > 0 && "bad"],
     ["Warnings", String(data.warnings), data.warnings > 0 && "odd"]];
+}
+
+function workspaceFigures() {
+  const {faults, imports} = workspace;
+  const counted = [["Projects", imports.projects], ["Files", sources], ["Declarations", declarations], ["Models", models],
+    ["Interfaces", declarations.filter((declared) => declared.kind === "interface")], ["Errors", faults, faults.length > 0 && "bad"]];
+  return counted.map(([name, list, kind]) => [name, list.length.toLocaleString("en"), kind]);
+}
+
+function showHeading() {
+  const figures = data.built ? buildFigures() : workspaceFigures();
   document.getElementById("figures").append(...figures.map(([name, value, kind]) =>
     make("div", {}, [make("dt", {}, name),
       make("dd", {class: kind || null, id: `figure-${name.split(" ")[0].toLowerCase()}`}, value)])));
   document.getElementById("title").textContent = data.title;
   document.getElementById("subtitle").textContent = `${data.subtitle} | ${clock(data.began)}`;
-  document.title = `${data.title}: build report`;
+  document.title = `${data.title}: ${data.built ? "build report" : "report"}`;
   const verdict = document.getElementById("verdict");
+  if (!data.built) {
+    verdict.textContent = "Nothing was built";
+    return;
+  }
   verdict.textContent = !data.completed ? "Ended early" : data.errors > 0 ? "Completed with errors" : "Completed";
   verdict.className = data.completed && data.errors === 0 ? "good" : "bad";
 }
@@ -227,5 +199,5 @@ for (const tab of tabs) {
 }
 document.getElementById("tabs").addEventListener("keydown", onTabKey);
 window.addEventListener("hashchange", showTab);
-showFigures();
+showHeading();
 showTab();

@@ -17,6 +17,7 @@ thread_local int64_t traceIndent = 0;
 bool stampLines = false;
 TraceHook* traceHook = nullptr;
 std::string* heldTrace = nullptr;
+int quietConsoles = 0;
 
 // Keeps what comes before a target exists, up to a bound.
 class TraceSink {
@@ -123,7 +124,11 @@ void WriteToTrace(std::string_view text) {
 void HoldTrace(std::string* held) { heldTrace = held; }
 void WriteHeldToTrace(std::string_view text) { Sink().Write(text); }
 
+QuietConsole::QuietConsole() { ++quietConsoles; }
+QuietConsole::~QuietConsole() { --quietConsoles; }
+
 void WriteToConsole(std::string_view text) {
+  if (quietConsoles > 0) return;
   if (platform::IsValidUtf8(text)) return platform::WriteStdout(text);
   if (!platform::StdoutIsTerminal()) throw StringConversionException();
   platform::WriteStdout(platform::WidenBytes(text));

@@ -23,6 +23,14 @@ void WriteHeldToTrace(std::string_view text);  // what was held
 
 // Writes to standard output as UTF-8 through the console writer, unbuffered by the tool.
 void WriteToConsole(std::string_view text);
+// While one is alive, nothing reaches standard output: neither this way nor through a trace log that ends there.
+class QuietConsole {
+ public:
+  QuietConsole();
+  ~QuietConsole();
+  QuietConsole(const QuietConsole&) = delete;
+  QuietConsole& operator=(const QuietConsole&) = delete;
+};
 
 // The line of a hint, to be written behind a message on a terminal; empty where a pipe or a file takes the output,
 // which holds messages alone.

@@ -175,7 +175,7 @@ def make_files_whose_call_builds_nothing(binary):
 
 def a_configuration_that_is_none(binary):
     quotes = "; a line of the configuration stands behind the file"
-    for argument, hint in (("--hlep", "did you mean --help?"), ("--frob", "the options are --graph --help --init --list --reflect --there --version --where --why"),
+    for argument, hint in (("--hlep", "did you mean --help?"), ("--frob", "the options are --graph --help --init --list --reflect --report --there --version --where --why"),
                            ("X=/p", "a variable has its value in quotes: 'X=\"/p\"'" + quotes)):
         with Workspace(binary, {}) as workspace:
             output = on_terminal([binary, argument], workspace.folder)

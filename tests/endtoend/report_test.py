@@ -231,5 +231,129 @@ def look_at_narrow_page(browser):
     browser.resize(1280, 900)
 
 
-run_tests([test_trace_tells_what_ran_when_and_why, test_trace_of_a_run_that_fails, test_files_that_cannot_be_written,
+ROOT = Path(__file__).resolve().parents[2]
+MODELS = r'''@import "Vesk/vxObject/IObject.h"
+@print("printed ")
+$interface+ IShape : vesk::IObject { float64 Area(int32 places = 2) const; };
+$enum Side { left, right = 7 };
+$struct Point { $int32:[ unit("mm"), "</script><i>" ] x; $xmap<string8,Side> sides; };
+$model+ Note
+{
+    string8 title;
+    float64 width : [ unit("mm") ];
+    $dropped { string8 head; string8 name; int32 inches; }
+    $schema { 1: +name +inches 2: -name +head 4: -inches -head +width +title }
+    $evolve { head(name) { head = name; } title(head) { title = head; } width(inches) { width = inches * 25.4; } }
+};
+$class+ Page isa IShape : model Note { };
+'''
+DECLARING = {
+    "all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n',
+    "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n',
+    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "Vesk/vxObject" }\n', '"a.h" "b.h" "<" { "b>.h" }',
+                                        '"app.cpp" ' + " ".join(f'"m{i}.cpp"' for i in range(20))),
+    "tree/app/a.h": '@import "app/</b>.h"\n' + MODELS, "tree/app/b.h": '@import "app/a.h"\n$struct Held { $Point at; };\n',
+    "tree/app/</b>.h": "inline int b() { return 0; }\n", "tree/app/src/app.cpp": '@import "app/b.h"\nint main() { return 0; }\n',
+    **{f"tree/app/src/m{i}.cpp": '@import "app/</b>.h"\n' for i in range(20)},
+}
+
+
+def shown_nodes(browser):
+    return browser.run("""return [...document.querySelectorAll("#panel-imports .node")].map((node) =>
+        [...node.querySelectorAll(":scope > text")].map((text) => text.textContent).reverse().join(""))""")
+
+
+@in_workspace(DECLARING)
+def test_page_without_a_build(workspace):
+    before = workspace.times("**/*")
+    equal(workspace.run("--report", "all.qrex", "out/page.html", 'config="Debug"'), "")
+    equal([path for path in workspace.changed(before, "**/*") if not Path(path).is_dir() and path != "out"], ["out/page.html"])
+    equal(json.loads(workspace.run("--reflect", "all.qrex", "--json"))["form"], 1)  # without what is printed on the way
+    with Browser() as browser:
+        browser.open(workspace.path("out/page.html"))
+        equal((browser.texts("#tabs a"), browser.texts("#verdict")), (["Models", "History", "Imports"], ["Nothing was built"]))
+        look_at_declarations(browser)
+        look_at_history(browser)
+        look_at_imports(browser)
+        for width in (400, 1280):
+            browser.resize(width, 800)
+            for tab in ("models", "models/Note", "history", "history/Note", "imports", "imports/app/a.h"):
+                browser.go(tab)
+                assert browser.run("return document.documentElement.scrollWidth") <= width, tab
+        equal(browser.texts("main b:not(.path), main i"), [])
+        equal((browser.console(), set(browser.requests())), ([], {f"file://{workspace.path('out/page.html')}"}))
+
+
+def look_at_declarations(browser):
+    found = lambda: [text.split("\n")[0] for text in browser.texts("#panel-models tbody th")]
+    for words, names in (("mm", {"Note", "Point"}), ("mm script", {"Point"}), ("ISHAPE", {"IShape", "IShapeDelegatorMixin", "Page"}), ("head", {"Note"})):
+        browser.run("document.querySelector('#panel-models input').value = ''")
+        browser.press("#panel-models input", words)
+        equal(set(found()), names)
+    browser.go("models/Point")
+    equal(browser.texts("#panel-models tbody tr")[0], 'x vesk::int32 mm "</script><i>"')
+    holds("\n".join(browser.texts(".facts")), "tree/app/a.h:6", "Held (field at)")
+    browser.click('#panel-models tbody a[href="#models/Side"]')
+    equal(browser.texts("#panel-models tbody tr"), ["left 0 default", "right 7"])
+    browser.go("models/IShape")
+    holds("\n".join(browser.texts("#panel-models")), "Page (implements it)", "float64 Area(vesk::int32 places = 2) const")
+
+
+def look_at_history(browser):
+    """Of a name that changed twice, of what is computed, and of a release that is left out."""
+    browser.press("#tab-models", "\ue014")
+    holds("\n".join(browser.texts("#panel-history tbody tr")), "Note", "4 2 1 1 2")
+    browser.click('#panel-history a[href="#history/Note"]')
+    equal([row.split("\n")[0] for row in browser.texts("#panel-history .plain tbody th")], ["name", "inches", "head", "width", "title"])
+    rows = [[cell.text for cell in row.find_elements("css selector", "td")]
+            for row in browser.driver.find_elements("css selector", "#panel-history .plain tbody tr")]
+    equal(rows, [["came", "renamed", ""], ["came", "is there", "went"], ["", "renamed", "renamed"], ["", "", "came"], ["", "", "renamed"]])
+    holds(browser.texts(".releases > li")[0], "Release 4, the latest", "came width vesk::float64, computed from inches", "width = inches * 25.4;",
+          "renamed title vesk::string8 from head", "went inches")
+    lacks(browser.texts(".releases > li")[0], "went head")
+
+
+def look_at_imports(browser):
+    right, left, up, enter = "\ue014", "\ue012", "\ue013", "\ue007"
+    browser.go("imports/app/a.h")
+    equal(shown_nodes(browser), ["app/a.h", "Vesk/vxObject/IObject.h", "app/</b>.h", "app/b.h"])
+    browser.press("#panel-imports .scroller", left)
+    holds(browser.texts("#panel-imports .told")[0], "app/b.h; project app; imports 1 file", "imported by 1 file, 1 in all; folded")
+    browser.press("#panel-imports .scroller", " ")
+    assert "app/src/app.cpp" in shown_nodes(browser) and "unfolded" in browser.texts("#panel-imports .told")[0]
+    browser.press("#panel-imports .scroller", " ", left, enter)
+    equal(browser.texts("#panel-imports h2"), ["Imports around app/b.h"])
+    browser.go("imports/app/</b>.h")
+    equal(shown_nodes(browser), ["app/</b>.h", "app/a.h", "20 filesapp/src/"])
+    browser.press("#panel-imports .scroller", left, "\ue015", " ")
+    equal(len(shown_nodes(browser)), 23)
+    holds("\n".join(browser.texts("#panel-imports tbody tr")), "app/src/m7.cpp importing app 1", "app/src/app.cpp\nby way of app/b.h\nimporting app 3")
+
+
+@in_workspace(DECLARING)
+def test_page_of_files_with_errors(workspace):
+    """In a build, what the page collects is not told twice; files behind the error are in it as well."""
+    workspace.write("tree/app/b.h", '@import "app/a.h"\n@fail("no <b>")\n')
+    workspace.write("tree/app/src/m0.cpp", '@import "Vesk/vxObject/IObject.h"\n$struct Behind { $int32 x; };\n')
+    comparable = lambda text: re.sub(r"\.{3,} *[\d.]+ ms|argv.*\n", "", text)
+    plain = workspace.run("all.qrex", status=1)
+    workspace.shell("rm -rf qrexsource out")
+    equal(comparable(workspace.run("all.qrex", REPORT, status=1)), comparable(plain))
+    log = workspace.run("--report", "all.qrex", "page.html", status=1)
+    holds(log, "b.h(2) : error : no")
+    with Browser() as browser:
+        for page in ("out/report.html", "page.html"):
+            browser.open(workspace.path(page), "models/Note")
+            holds(browser.texts("#panel-models .notice")[0], "1 error in the workspace", "2 files", "tree/app/b.h:2: no <b>")
+            equal(len(browser.texts("#panel-models .facts")), 1)
+            browser.go("models/Behind")
+            equal(browser.texts("#panel-models tbody tr"), ["x vesk::int32"])
+            browser.go("imports/app/b.h")
+            equal(len(browser.driver.find_elements("css selector", ".node.failed")), 1)
+        equal(browser.console(), [])
+    for arguments, told in ((["all.qrex"], "PAGE.html is missing\nUsage: Qrex --report"), (["all.qrex", "tree/app/a.h/x.html"], "Error: File error")):
+        holds(workspace.run("--report", *arguments, status=1), told)
+
+
+run_tests([test_page_without_a_build, test_page_of_files_with_errors, test_trace_tells_what_ran_when_and_why, test_trace_of_a_run_that_fails, test_files_that_cannot_be_written,
            test_page_in_a_browser])
