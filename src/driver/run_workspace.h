@@ -29,8 +29,4 @@ bool FollowPositions(ConfigSettings& settings, Follow follow, const std::vector<
 // or translated, or the question is about nothing that is there.
 bool AnswerQuestion(ConfigSettings& settings, const Question& question);
 
-// The deepest directory of the path that holds the marker, and the path relative to it.
-bool FindWorkspaceRoot(const std::string& path, std::string& root, std::string& relative);
-bool CheckPathSyntax(const ConfigSettings& settings);
-
 }  // namespace qrex

@@ -1,6 +1,7 @@
 // The configuration file: what statements do to the settings, the messages, and what a mode demands.
 
 #include "driver/config_parser.h"
+#include "driver/configured_paths.h"
 #include "driver/run_workspace.h"
 #include "world_fixture.h"
 
