@@ -36,7 +36,7 @@ inline constexpr CallForm kCallForms[] = {
     {"--reflect", "[NAME=\"VALUE\" ...] FILE.qrex [--json] [LINE ...]",
      "lists all declarations, with --json their members and histories: docs/reflect.md has the form"},
     {"--report", "[NAME=\"VALUE\" ...] FILE.qrex PAGE.html [LINE ...]",
-     "writes a page on the models, their histories and the imports of a workspace, without building it"},
+     "writes a page on the models, histories and imports of a workspace, without a build"},
     {"--help", "", "this text"},
     {"--version", "", "the release"},
 };
