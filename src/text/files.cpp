@@ -159,6 +159,7 @@ FileStamp FileTimes::StampOf(const std::string& path) {
   const size_t slash = path.rfind('/');
   const size_t nameBegin = slash == std::string::npos ? 0 : slash + 1;
   if (!m_last || std::string_view(path).substr(0, nameBegin) != m_last->first) {
+    m_last = nullptr;
     if (m_directories.size() > kMostDirectories) m_directories.clear();
     m_last = &*m_directories.try_emplace(path.substr(0, nameBegin)).first;
   }

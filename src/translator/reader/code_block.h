@@ -13,10 +13,10 @@ class QrexParser;
 
 // On the `{`. Copies through the matching `}` and up to the next token, which is current afterwards, and ends the line.
 void CopyCodeBlock(QrexParser& parser, ClassDef& def);
-// Behind a `=`: a block in braces and a `;`, or an expression up to `;`, as "name = expression" without a `;` of its
-// own. The current token is the `;` afterwards, and the text is dropped from the source.
 // Text that does not stay where it is written: with marks for its lines where `#line` is wanted.
 std::string MarkedText(const QrexParser& parser, const char* begin, const char* end);
+// Behind a `=`: a block in braces and a `;`, or an expression up to `;`, as "name = expression" without a `;` of its
+// own. The current token is the `;` afterwards, and the text is dropped from the source.
 std::string ReadShortBody(QrexParser& parser, const ClassDef& def, const std::string& name);
 // The text between the braces; the current token is the closing one afterwards.
 std::string ReadBraceContent(QrexParser& parser, const ClassDef& def);
