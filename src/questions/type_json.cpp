@@ -1,60 +1,49 @@
 #include "questions/type_json.h"
 
 #include <cmath>
-#include <cstring>
 
 #include "text/numbers.h"
 #include "translator/symbols/declaration_kinds.h"
+#include "translator/types/metadata.h"
 
 namespace qrex {
 
 namespace {
 
-uint64_t LittleEndian(std::string_view bytes, size_t count) {
-  uint64_t value = 0;
-  for (size_t i = count; i-- > 0;) value = value << 8 | static_cast<unsigned char>(bytes[i]);
-  return value;
-}
-
-void WriteFloat(JsonWriter& json, uint64_t bits) {
-  double value;
-  std::memcpy(&value, &bits, sizeof value);
+void WriteFloat(JsonWriter& json, double value) {
   std::isfinite(value) ? json.Value(value) : json.Value(ToString(value));
 }
 
-// Writes the value at the head; what is behind it.
-std::string_view WriteValue(JsonWriter& json, std::string_view code) {
-  const std::string_view behind = SkipMetadataValue(code);
-  const auto op = static_cast<uint8_t>(code.front());
-  code.remove_prefix(1);
-  std::string_view text;
-  if (op >= kOpMetaFunctor) {
-    const bool isList = op >= kOpMetaList;
-    if (!isList) {
-      ReadCompactString(code, text);
-      json.Open('{').Member("call", text).Key("arguments");
-    }
-    json.Open('[');
-    for (size_t count = op - (isList ? kOpMetaList : kOpMetaFunctor); count > 0; --count) code = WriteValue(json, code);
-    json.Close(']');
-    if (!isList) json.Close('}');
-  } else if (op == kOpMetaString) {
-    ReadCompactString(code, text);
-    json.Value(text);
-  } else if (op == kOpMetaBool) {
-    json.Value(code.front() != 0);
-  } else if (op == kOpMetaInt) {
-    json.Value(int64_t{static_cast<int32_t>(LittleEndian(code, 4))});
-  } else {
-    WriteFloat(json, LittleEndian(code, 8));
-  }
-  return behind;
+void WriteValue(JsonWriter& json, const MetadataValue& value);
+
+void WriteValues(JsonWriter& json, const std::vector<MetadataValue>& values) {
+  json.Open('[');
+  for (const MetadataValue& value : values) WriteValue(json, value);
+  json.Close(']');
 }
 
-// What is in front of a type: each of its values is a list of its own.
-std::string_view MetadataOf(TypeView type) {
-  const std::string_view code = type.Code();
-  return code.substr(0, code.size() - type.WithoutMetadata().Code().size());
+void WriteValue(JsonWriter& json, const MetadataValue& value) {
+  switch (value.kind) {
+    case MetadataValue::Kind::Bool:
+      json.Value(value.number != 0);
+      break;
+    case MetadataValue::Kind::Int:
+      json.Value(int64_t{value.number});
+      break;
+    case MetadataValue::Kind::Float:
+      WriteFloat(json, value.real);
+      break;
+    case MetadataValue::Kind::String:
+      json.Value(value.text);
+      break;
+    case MetadataValue::Kind::List:
+      WriteValues(json, value.values);
+      break;
+    case MetadataValue::Kind::Functor:
+      json.Open('{').Member("call", value.text).Key("arguments");
+      WriteValues(json, value.values);
+      json.Close('}');
+  }
 }
 
 std::string_view KindOf(TypeView type) {
@@ -73,7 +62,7 @@ std::string_view KindOf(TypeView type) {
 }
 
 void WriteShape(JsonWriter& json, TypeView type, bool isOuter) {
-  const std::string_view metadata = MetadataOf(type);
+  const std::string_view metadata = type.Metadata();
   type = type.WithoutMetadata();
   json.Open('{').Member("kind", KindOf(type));
   if (!isOuter) WriteMetadata(json, metadata);
@@ -100,17 +89,16 @@ std::string_view DirectionOf(ArgDirection direction) {
 void WriteMetadata(JsonWriter& json, std::string_view metadata) {
   if (metadata.empty()) return;
   json.Key("metadata");
-  const auto op = static_cast<uint8_t>(metadata.front());
-  const bool isOneList = op >= kOpMetaList && SkipMetadataValue(metadata).empty();
-  if (!isOneList) json.Open('[');
-  while (!metadata.empty()) metadata = WriteValue(json, metadata);
-  if (!isOneList) json.Close(']');
+  std::vector<MetadataValue> values;
+  while (!metadata.empty()) values.push_back(TakeMetadataValue(metadata));
+  const bool isOneList = values.size() == 1 && values[0].kind == MetadataValue::Kind::List;
+  WriteValues(json, isOneList ? values[0].values : values);
 }
 
 void WriteTypeMembers(JsonWriter& json, TypeView type) {
   json.Member("type", TypeText(type)).Key("shape");
   WriteShape(json, type, true);
-  WriteMetadata(json, MetadataOf(type));
+  WriteMetadata(json, type.Metadata());
 }
 
 void WriteSignature(JsonWriter& json, const FunctionSignature& signature) {

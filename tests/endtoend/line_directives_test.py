@@ -6,8 +6,8 @@ import sys
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
-from runtime_fixture import ROOT, translate, write_library  # noqa: E402
-from workspace_fixture import SETTINGS, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from runtime_fixture import ROOT, translate, translated_shop, write_library  # noqa: E402
+from workspace_fixture import equal, holds, lacks, need, run_tests  # noqa: E402
 
 KEY = "lineDirectives = true "
 OUT = "qrexsource/x64/Debug/"
@@ -71,15 +71,7 @@ def line_of(text, what):
 
 
 def shop(binary, keys=KEY, main=MAIN, header=SHOP):
-    """The translated project `app`, with the runtime."""
-    settings = SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true {keys}'
-    files = {"all.qrex": settings, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "app" }\n',
-             "tree/app/src/shop.h": header, "tree/app/src/app.cpp": main,
-             "tree/app/src/app.qrpj": '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nqrex subproj { "Vesk/vxObject" }\n'
-                                      'config { "Debug|x64" }\n{ "src" { "shop.h" "app.cpp" } }\n'}
-    workspace = Workspace(binary, files)
-    workspace.run("all.qrex")
-    return workspace
+    return translated_shop(binary, keys, main, header)
 
 
 def compiled_lines(workspace, compiler, source, include):

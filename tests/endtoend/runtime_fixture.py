@@ -42,6 +42,18 @@ def translate(binary, workspace_file, keys="", tree=TREE):
     return workspace, "qrexsource/x64/Debug"
 
 
+def translated_shop(binary, keys, main, header):
+    """A workspace with the translated project `app`, of a source and `shop.h`, and the library."""
+    settings = SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true {keys}'
+    files = {"all.qrex": settings, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "app" }\n',
+             "tree/app/src/shop.h": header, "tree/app/src/app.cpp": main,
+             "tree/app/src/app.qrpj": '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nqrex subproj { "Vesk/vxObject" }\n'
+                                      'config { "Debug|x64" }\n{ "src" { "shop.h" "app.cpp" } }\n'}
+    workspace = Workspace(binary, files)
+    workspace.run("all.qrex")
+    return workspace
+
+
 def write_library(workspace):
     """The library as one source, whose compilation takes the time of one."""
     workspace.write("library.cpp", "".join(f'#include "Vesk/vxObject/src/{name}.cpp"\n' for name in LIBRARY))

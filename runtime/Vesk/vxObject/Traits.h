@@ -2,6 +2,9 @@
 // answers for everything else.
 
 @import "Vesk/vxObject/Platform.h"
+#ifdef __cpp_impl_reflection
+@import "Vesk/vxObject/Annotations.h"
+#endif
 
 namespace vesk {
 

@@ -4,6 +4,7 @@
 
 #include "translator/class/text_checks.h"
 #include "translator/declared/class_def.h"
+#include "translator/emit/annotations.h"
 #include "translator/emit/emit.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -100,6 +101,7 @@ void ParseFieldOrMethod(QrexParser& parser, ClassDef& def) {
     parser.Fail("; expected after field declaration when read " + Printed(parser.current));
   }
   if (!def.ExternalDefinition()) {
+    WriteAnnotations(parser.out, def, member.returnType, OutputLine::HasText);
     Write(parser.out, "$type$ $name$;", "type"_ = TypeView(member.returnType), "name"_ = name);
     parser.Flush();
   }

@@ -4,6 +4,7 @@
 
 #include "translator/class/class_members.h"
 #include "translator/class/node_text.h"
+#include "translator/emit/annotations.h"
 #include "translator/emit/emit.h"
 #include "translator/reader/code_block.h"
 #include "translator/reader/qrex_parser.h"
@@ -180,7 +181,10 @@ void NodeField::WriteSectionHead(const SectionWord& section) {
 
 void NodeField::WriteDep() {
   const TypeView type = m_type;
-  if (!m_isVoid) Write(m_out, "mutable $type$ $storage$;\n", "type"_ = type, "storage"_ = m_storage);
+  if (!m_isVoid) {
+    WriteAnnotations(m_out, m_def, type, OutputLine::HasText);
+    Write(m_out, "mutable $type$ $storage$;\n", "type"_ = type, "storage"_ = m_storage);
+  }
   Write(m_out, R"(
     struct Depnode_$name$ : vesk::DGDepNode
     {
@@ -217,6 +221,7 @@ void NodeField::WriteDep() {
 
 void NodeField::WriteIndep() {
   const std::string self = m_def.name + "* _self = ATTRIB_CAST(" + m_def.name + "," + m_name + ");";
+  WriteAnnotations(m_out, m_def, m_type, OutputLine::HasText);
   Write(m_out, R"(
     $type$ $storage$;
     struct Indepnode_$name$ : vesk::DGIndepNode

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 
+#include "translator/emit/annotations.h"
 #include "translator/emit/emit.h"
 #include "translator/model/model_accessors.h"
 #include "translator/reader/qrex_parser.h"
@@ -100,6 +101,7 @@ void WriteComparisons(TextWriter& out, const ClassDef& def) {
 
 void WriteFieldDeclarations(TextWriter& out, const ClassDef& def) {
   for (const ModelField* field : NonDropped(def)) {
+    WriteAnnotations(out, def, field->m_type, OutputLine::Begins);
     PrintDeclaration(out, field->m_type, field->m_name, DeclarationMode::Plain);
     out << ";\n";
   }

@@ -31,6 +31,10 @@ TypeView TypeView::WithoutMetadata() const {
   return type;
 }
 
+std::string_view TypeView::Metadata() const {
+  return m_code.substr(0, m_code.size() - WithoutMetadata().m_code.size());
+}
+
 std::string_view TypeView::Name() const {
   std::string_view rest = m_code.substr(kOpBytes), name;
   ReadCompactString(rest, name);

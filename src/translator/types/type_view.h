@@ -37,7 +37,8 @@ class TypeView {
   TypeView Value() const { return Inner(); }
   uint32_t Count() const;  // of a fixed array
 
-  TypeView WithoutMetadata() const;  // the head's metadata skipped
+  TypeView WithoutMetadata() const;   // the head's metadata skipped
+  std::string_view Metadata() const;  // of the head: lists, one behind the other
 
  private:
   std::string_view Behind() const;  // what is in the code behind the type at the head

@@ -1,0 +1,109 @@
+#!/usr/bin/env python3
+"""Metadata as annotations of C++26. No compiler here reads them: what they hold is checked as constants, and where they stand
+as the attributes that they are."""
+
+import re
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from runtime_fixture import TOUR, translate, translated_shop  # noqa: E402
+from workspace_fixture import equal, holds, lacks, need, run_tests  # noqa: E402
+
+KEY = "annotations = true "
+OUT = "qrexsource/x64/Debug"
+HEADER = r"""@import "Vesk/vxObject/IObject.h"
+namespace shop
+{
+struct Unit { char name[8]{}; int power = 1; double scale = 1; bool operator==(const Unit&) const = default; };
+constexpr Unit unit(const char (&name)[3], int power = 1, double scale = 1) { return {{name[0], name[1]}, power, scale}; }
+constexpr Unit times(Unit unit, int factor) { unit.power *= factor; return unit; }
+inline constexpr Unit bare{};
+
+$struct+ Size
+{
+    $float64 width : [ unit("mm"), 5, -2147483647 - 1, 2.5, 3.0, true ]; $float64 height : [ bare, times(unit("m ", 2, 1e300), -1) ];
+    $int32 counts[4] : [ "a \"text\" \\ of\ttab" ];
+    $string8 : [ [ 1, "list", [ ] ], false ] name;
+    $int32 plain;
+    $void Grow(float64 by : [ unit("mm") ]) { width += by; }
+    $indep float64 price : [ unit("eu") ];
+    $dep float64 tax : [ unit("eu") ] = { tax = price / 5; };
+};
+$model+ Place
+{
+    string8 street : [ "where" ];
+    int32 number : [ unit("nr") ];
+};
+$class+ Shop : model
+{
+    int32 pieces : [ unit("pc"), 1 ];
+    xvector<float64> prices : [ unit("eu") ];
+}
+{
+};
+}
+"""
+MAIN = """@import "shop.h"
+int main() { return sizeof(shop::Size) > sizeof(shop::Shop) ? 0 : 1; }
+"""
+EXPECTED = [
+    '=unit("mm"), =5, =(-2147483647 - 1), =2.5, =3.0, =true',
+    '=bare, =times(unit("m ", 2, 1.0000000000000000525e+300), -1)',
+    r'=vesk::AnnotationText("a \"text\" \\ of\011tab")',
+    '=vesk::AnnotationList(1, vesk::AnnotationText("list"), vesk::AnnotationList()), =false',
+    '=unit("eu")', '=unit("eu")', '=vesk::AnnotationText("where")', '=unit("nr")', '=unit("pc"), =1', '=unit("eu")']
+ANNOTATION = re.compile(r"\[\[(=.*?)\]\]")
+FORMS = {  # clang 14 takes no floats as arguments of templates
+    "g++": "using Constants{} = Constants<{}>; [[maybe_unused]]",
+    "clang++": "static constexpr auto kConstants{} = vesk::AnnotationList({}); [[maybe_unused]]"}
+
+
+def checked(text, compiler):
+    """For each annotation a declaration that takes its values as constants, and an attribute of the member."""
+    count = iter(range(99))
+    values = lambda found: re.sub(r"(^|, )=", r"\1", found[1])  # noqa: E731
+    return "template <auto...> struct Constants {};\n" + ANNOTATION.sub(
+        lambda found: FORMS[compiler].format(next(count), values(found)), text)
+
+
+def members(binary):
+    for keys in (KEY, KEY + "lineDirectives = true "):
+        with translated_shop(binary, keys, MAIN, HEADER) as workspace:
+            text = workspace.path(f"{OUT}/app/src/shop.h").read_text()
+            equal(ANNOTATION.findall(text), EXPECTED)
+            include = f"-I{OUT} -I{OUT}/app/src"
+            for compiler in ("g++", "clang++"):
+                need(compiler)
+                text = workspace.shell(f"{compiler} -std=c++20 -E -D__cpp_impl_reflection=202506L {include} {OUT}/app/src/app.cpp")
+                equal(len(ANNOTATION.findall(text)), len(EXPECTED))
+                workspace.write("seen.cpp", checked(text, compiler))
+                workspace.shell(f"{compiler} -std=c++20 -Wall -Werror -fsyntax-only seen.cpp")
+                workspace.write("wrong.cpp", checked(text.replace('[[=unit("pc")', '[[=unit("piece")'), compiler))
+                holds(workspace.shell(f"{compiler} -std=c++20 -fsyntax-only wrong.cpp 2>&1 || true"), " error: ")
+
+
+def same_objects(binary):
+    """A compiler without reflection makes the same of it, debug information apart."""
+    workspace, root = translate(binary, "tour.qrws", tree=TOUR / "tree")
+    with workspace:
+        objects = []
+        for keys in ((), ("annotations=true", "rebuildAll=true")):
+            workspace.run("all.qrex", *keys)
+            holds(workspace.path(f"{root}/orders/api/order.h").read_text(), *[EXPECTED[-2].replace("pc", "piece")] * len(keys[:1]))
+            for source in sorted(workspace.path(root).glob("*/src/*.cpp")):
+                project = source.relative_to(workspace.path(root)).parts[0]
+                workspace.shell(f"g++ -std=c++17 -g -O1 -I{root} -I{root}/{project} -I{root}/{project}/src -c {source} -o seen.o && objcopy -g seen.o")
+                objects.append((source.name, workspace.path("seen.o").read_bytes()))
+        half = len(objects) // 2
+        assert half >= 3
+        equal([name for name, code in objects[:half] if (name, code) not in objects[half:]], [])
+
+
+def without_the_key(binary):
+    with translated_shop(binary, "", MAIN, HEADER) as workspace:
+        lacks(workspace.path(f"{OUT}/app/src/shop.h").read_text(), "__cpp_impl_reflection")
+
+
+if __name__ == "__main__":
+    run_tests([members, same_objects, without_the_key])
