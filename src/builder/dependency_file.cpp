@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <vector>
 
-#include "builder/payload.h"
+#include "text/payload.h"
 #include "text/files.h"
 #include "text/numbers.h"
 

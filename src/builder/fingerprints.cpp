@@ -3,7 +3,7 @@
 #include <algorithm>
 #include <cstring>
 
-#include "builder/payload.h"
+#include "text/payload.h"
 #include "text/paths.h"
 #include "text/text_writer.h"
 

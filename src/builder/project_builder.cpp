@@ -14,6 +14,7 @@
 #include "text/output_policy.h"
 #include "text/paths.h"
 #include "text/trace.h"
+#include "translator/file/position_map.h"
 #include "translator/file/translate_file.h"
 
 namespace qrex {
@@ -384,7 +385,10 @@ void ProjectBuilder::Clean(const std::string& dependencyFile) {
   remove(dependencyFile);
   if (settings.fingerprints) remove(FingerprintPath(dependencyFile));
   if (!settings.schemaLock.empty()) remove(ProjectSchemas::NotePath(dependencyFile));
-  for (const ProjectFile* file : project.files) remove(paths.Translated(*file));
+  for (const ProjectFile* file : project.files) {
+    remove(paths.Translated(*file));
+    if (settings.positionMaps) remove(PositionMap::PathFor(paths.Translated(*file)));
+  }
 }
 
 namespace {

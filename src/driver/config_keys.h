@@ -52,6 +52,7 @@ inline constexpr ConfigKey<bool ConfigSettings::*> kBoolKeys[] = {
     {"compilableText", &ConfigSettings::compilableText, "write text that compiles, and warn where none does"},
     {"lineDirectives", &ConfigSettings::lineDirectives,
      "#line in generated text: debuggers and compilers speak of the sources"},
+    {"positionMaps", &ConfigSettings::positionMaps, "keep what --where needs beside translated files"},
     {"annotations", &ConfigSettings::annotations, "metadata of members also as annotations of C++26"},
     {"ninja", &ConfigSettings::ninja, "gen writes build.ninja as well, beside make files"},
     {"failOnErrors", &ConfigSettings::failOnErrors, "end with status 1 when errors of tools were counted"},

@@ -3,7 +3,7 @@
 #include <algorithm>
 
 #include "builder/dependency_file.h"
-#include "builder/staleness.h"
+#include "builder/make_reason.h"
 #include "driver/depfile.h"
 #include "text/files.h"
 #include "text/text_writer.h"
@@ -76,15 +76,27 @@ const TextLines& FollowedFiles::LinesOf(const std::string& path) {
   return *lines;
 }
 
+IOutputStream* FollowedFiles::KeepingFiles::TextKeeper(const ScannedFile& file) {
+  return &(m_texts[&file] = std::make_unique<KeptText>())->stream;
+}
+
+std::string FollowedFiles::KeepingFiles::TextOf(const ScannedFile& file) const {
+  std::string text;
+  m_texts.at(&file)->buffer.AppendTo(text);
+  return text;
+}
+
 // Null where the project lacks the configuration of the run.
-BuildFiles* FollowedFiles::FilesOf(Project& project) {
+FollowedFiles::ReadProject* FollowedFiles::ProjectOf(Project& project) {
   const auto [entry, isNew] = m_projects.try_emplace(&project);
   ConfigSettings& settings = *project.settings;
   ProjectConfig* const config = isNew ? project.FindConfig(settings.config, settings.platform) : nullptr;
   if (config) {
     project.CollectFiles();
-    entry->second = std::make_unique<BuildFiles>(settings, project, *config);
-    LoadDependencyFile(*entry->second, DependencyFilePath(project, *config));
+    entry->second = std::make_unique<ReadProject>(settings, project, *config);
+    const std::string dependencyFile = DependencyFilePath(project, *config);
+    LoadDependencyFile(entry->second->files, dependencyFile);
+    if (settings.fingerprints) entry->second->prints.emplace(entry->second->files, dependencyFile);
   }
   return entry->second.get();
 }
@@ -92,22 +104,34 @@ BuildFiles* FollowedFiles::FilesOf(Project& project) {
 std::unique_ptr<FollowedFiles::Followed> FollowedFiles::Make(const std::string& path) {
   ProjectFile* const file = m_workspace.FindFile(path);
   if (!file || !IsTranslated(*file->project) || !IsTranslated(*file)) return nullptr;
-  BuildFiles* const files = FilesOf(*file->project);
-  if (!files) return nullptr;
+  ReadProject* const project = ProjectOf(*file->project);
+  if (!project) return nullptr;
+  ScannedFile& scanned = project->files.GetScannedFile(*file);
   auto followed = std::make_unique<Followed>();
-  followed->scanned = &files->GetScannedFile(*file);
-  followed->generatedPath = files->paths.Translated(*file);
+  followed->scanned = &scanned;
+  followed->generatedPath = project->files.paths.Translated(*file);
   // Asked ahead of the translation, which learns of other imports than those that the text was made with.
-  followed->isStale = !files->dependencyFileLoaded || NeedsTranslation(*files, *followed->scanned);
+  const ProjectPrints* const prints = project->prints ? &*project->prints : nullptr;
+  followed->isStale = !project->files.dependencyFileLoaded || MustTranslate(project->files, scanned, prints);
   try {
-    BringUpToDate(*followed->scanned);
+    followed->map = MapOf(*project, scanned, LinesOf(followed->generatedPath).Text());
   } catch (const FaultyFileException&) {
     return nullptr;  // it has been told
   } catch (const IException& exception) {
-    files->settings.Tell(ErrorOf(exception));
+    project->files.settings.Tell(ErrorOf(exception));
     return nullptr;
   }
   return followed;
+}
+
+PositionMap FollowedFiles::MapOf(ReadProject& project, ScannedFile& file, std::string_view generated) {
+  if (!IsTranslatedKind(file.file.kind)) return PositionMap::OfCopy(file.SourcePath());
+  const auto kept = PositionMap::Load(project.files.paths.Translated(file.file), generated);
+  if (kept) return *kept;
+  BringUpToDate(file);
+  const std::string text = project.files.TextOf(file);
+  PositionMap map = PositionMap::OfTranslation(file, text);
+  return text == generated ? map : map.RealignedTo(generated, text, file.frame.dialect);
 }
 
 FollowedFiles::Followed* FollowedFiles::Find(const std::string& file) {
@@ -116,25 +140,14 @@ FollowedFiles::Followed* FollowedFiles::Find(const std::string& file) {
   return entry->second.get();
 }
 
-bool FollowedFiles::SourceOf(const Followed& followed, int64_t line, std::string& path, int64_t& sourceLine) {
-  if (followed.scanned->text.lines.empty()) {  // a copy
-    path = followed.scanned->SourcePath();
-    sourceLine = line;
-    return true;
-  }
-  MemoryTextWriter ignored;
-  return followed.scanned->MapGeneratedLine(line, ignored, path, sourceLine);
-}
-
 bool FollowedFiles::Back(const std::string& file, int64_t line, int64_t column, FollowedPlace& place) {
   const Followed* const followed = Find(file);
   if (!followed) return false;
   const TextLines& generated = LinesOf(followed->generatedPath);
   if (line < 1 || line > generated.Count()) return false;
-  if (!SourceOf(*followed, line, place.path, place.line)) {  // ahead of all that was copied, as a guard is
-    place.path = followed->scanned->SourcePath();
-    place.line = 1;
-  }
+  const SourceLineView source = followed->map.Find(line);
+  place.path = source.path;
+  place.line = std::max<int64_t>(source.line, 1);
   place.isStale = followed->isStale;
   place.column = column == 0 ? 0 : FollowColumn(generated.Line(line), column, LinesOf(place.path).Line(place.line));
   return true;
@@ -144,10 +157,10 @@ void FollowedFiles::Index(Followed& followed) {
   followed.isIndexed = true;
   const std::string own = followed.scanned->SourcePath();
   const TextLines& generated = LinesOf(followed.generatedPath);
-  std::string path;
-  for (int64_t line = 1, source; line <= generated.Count(); ++line) {
+  for (int64_t line = 1; line <= generated.Count(); ++line) {
     if (followed.scanned->HasLineDirectives() && generated.Line(line).starts_with("#line ")) continue;
-    if (SourceOf(followed, line, path, source) && path == own) followed.firstGenerated.emplace(source, line);
+    const SourceLineView source = followed.map.Find(line);
+    if (source.line != 0 && source.path == own) followed.firstGenerated.emplace(source.line, line);
   }
 }
 

@@ -1,15 +1,19 @@
 // The files of a workspace with the way between their sources and their generated text, as far as they are asked for:
-// each is translated in memory then, with what it imports. Nothing is written.
+// as it was kept beside the text, or else each is translated in memory, with what it imports. Nothing is written.
 #pragma once
 
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <optional>
 #include <string>
 #include <string_view>
 #include <unordered_map>
 
 #include "builder/build_files.h"
+#include "builder/project_prints.h"
+#include "text/stream_adapters.h"
+#include "translator/file/position_map.h"
 #include "workspace/workspace.h"
 
 namespace qrex {
@@ -19,6 +23,7 @@ class TextLines {
  public:
   explicit TextLines(const std::string& path);  // empty if it cannot be read
   int64_t Count() const { return static_cast<int64_t>(m_starts.size()) - 1; }
+  const std::string& Text() const { return m_text; }
   std::string_view Line(int64_t number) const;  // without its end; empty if there is none
 
  private:
@@ -45,22 +50,42 @@ class FollowedFiles {
   bool Forth(const std::string& file, int64_t line, int64_t column, FollowedPlace& place);
 
  private:
+  // Keeps the texts that translations give.
+  class KeepingFiles : public BuildFiles {
+   public:
+    using BuildFiles::BuildFiles;
+    IOutputStream* TextKeeper(const ScannedFile& file) override;
+    std::string TextOf(const ScannedFile& file) const;
+
+   private:
+    struct KeptText {
+      PagedBuffer buffer;
+      PagedBufferToOutputStreamAdapter stream{buffer};
+    };
+    std::unordered_map<const ScannedFile*, std::unique_ptr<KeptText>> m_texts;
+  };
+  struct ReadProject {
+    ReadProject(ConfigSettings& settings, Project& project, ProjectConfig& config) : files(settings, project, config) {}
+    KeepingFiles files;
+    std::optional<ProjectPrints> prints;  // with the key fingerprints
+  };
   struct Followed {
-    ScannedFile* scanned = nullptr;
+    const ScannedFile* scanned = nullptr;
     std::string generatedPath;
+    PositionMap map;
     bool isStale = false;
     bool isIndexed = false;
     std::map<int64_t, int64_t> firstGenerated;  // by line of the source
   };
   Followed* Find(const std::string& file);
   std::unique_ptr<Followed> Make(const std::string& file);
-  BuildFiles* FilesOf(Project& project);
-  bool SourceOf(const Followed& followed, int64_t line, std::string& path, int64_t& sourceLine);
+  PositionMap MapOf(ReadProject& project, ScannedFile& file, std::string_view generated);
+  ReadProject* ProjectOf(Project& project);
   void Index(Followed& followed);
   const TextLines& LinesOf(const std::string& path);
 
   Workspace& m_workspace;
-  std::unordered_map<const Project*, std::unique_ptr<BuildFiles>> m_projects;
+  std::unordered_map<const Project*, std::unique_ptr<ReadProject>> m_projects;
   std::unordered_map<std::string, std::unique_ptr<Followed>> m_files;
   std::unordered_map<std::string, std::unique_ptr<TextLines>> m_texts;
 };

@@ -56,6 +56,8 @@ constexpr std::array<std::array<uint32_t, 256>, kCrcStep> MakeCrcTables() {
   return tables;
 }
 
+}  // namespace
+
 uint32_t Crc32(std::string_view bytes) {
   static constexpr auto kTables = MakeCrcTables();
   uint32_t crc = 0xFFFFFFFF;
@@ -69,8 +71,6 @@ uint32_t Crc32(std::string_view bytes) {
   for (const char byte : bytes) crc = crc >> 8 ^ kTables[0][(crc ^ static_cast<unsigned char>(byte)) & 0xFF];
   return ~crc;
 }
-
-}  // namespace
 
 bool FileExists(const std::string& path) { return platform::CanRead(Checked(path)); }
 

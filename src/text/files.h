@@ -70,6 +70,7 @@ class LeftoverSweep {
 enum class ReadOnlyTarget { Refuse, Replace };
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
 
+uint32_t Crc32(std::string_view bytes);  // IEEE 802.3
 // A 16-byte header (magic, CRC-32 by IEEE 802.3, signed 64-bit size, all little-endian), then the payload.
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path);
 // Raises FileException. A file that holds the same already is not replaced, but gets the present time.

@@ -30,6 +30,7 @@ std::string TranslationKeys(const ConfigSettings& settings) {
   add("modernCpp", settings.modernCpp ? "true" : "false");
   add("compilableText", settings.compilableText ? "true" : "false");
   if (settings.lineDirectives) add("lineDirectives", "true");
+  if (settings.positionMaps) add("positionMaps", "true");
   if (settings.annotations) add("annotations", "true");
   for (const std::string& root : settings.virtualTree) add("virtualTree", root);
   for (const auto& [name, value] : settings.context.rootFrame.Substitutions()) {

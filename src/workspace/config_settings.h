@@ -60,6 +60,7 @@ struct ConfigSettings {
   bool modernCpp = false;
   bool compilableText = false;
   bool lineDirectives = false;        // translator/reader/line_directives.h
+  bool positionMaps = false;          // translator/file/position_map.h
   bool annotations = false;           // translator/emit/annotations.h
   int64_t jobs = 1;                   // tools at once; 0: as many as there are processors
   std::vector<std::string> launcher;  // words ahead of compilers

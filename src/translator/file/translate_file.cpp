@@ -15,11 +15,6 @@ class DiscardStream : public IOutputStream {
   void Flush() override {}
 };
 
-bool IsTranslatedKind(FileKind kind) {
-  return kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H || kind == FileKind::Asm ||
-         kind == FileKind::Py;
-}
-
 // The output holds the tails of this translation, and no longer those of the one before.
 void HoldTails(ScannedFile& file, const std::vector<ScannedFile*>& oldImports) {
   for (ScannedFile* import : oldImports) {
@@ -63,7 +58,8 @@ void TranslateAndWrite(ScannedFile& file) {
 
 void MakeDeclarations(ScannedFile& file) {
   DiscardStream discarded;
-  Translate(file, discarded);
+  IOutputStream* const keeper = file.host.TextKeeper(file);
+  Translate(file, keeper ? *keeper : discarded);
 }
 
 void WorkOn(ScannedFile& file) {
@@ -126,6 +122,11 @@ void Begin(ScannedFile& file, Work work) {
 }
 
 }  // namespace
+
+bool IsTranslatedKind(FileKind kind) {
+  return kind == FileKind::C || kind == FileKind::Cpp || kind == FileKind::H || kind == FileKind::Asm ||
+         kind == FileKind::Py;
+}
 
 void BringUpToDate(ScannedFile& file) { Begin(file, WorkOn); }
 

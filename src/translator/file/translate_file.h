@@ -12,6 +12,8 @@ class FaultyFileException : public LexScannerException {
   using LexScannerException::LexScannerException;
 };
 
+bool IsTranslatedKind(FileKind kind);  // others are copied
+
 // Translates the file and all that it imports, each once per run, and writes the output when `needsWriting` is set (and
 // clears it). A file of a kind that is not translated is copied then. In a run that keeps going a file that has an
 // error, or imports one that has, raises a FaultyFileException, however often it is asked for.

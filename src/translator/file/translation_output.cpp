@@ -7,6 +7,7 @@
 #include "lex/scanner.h"
 #include "text/files.h"
 #include "text/trace.h"
+#include "translator/file/position_map.h"
 
 namespace qrex {
 
@@ -18,12 +19,9 @@ void PrepareTarget(const std::string& path) {
 }
 
 // With `#line` directives, positions are of the text, too: a file in which only they have moved is written.
-bool IsTokenEquivalent(const std::string& path, GeneratedFile& generated, const ScannedFile& file) {
+bool IsTokenEquivalent(const std::string& old, const std::string& text, const ScannedFile& file) {
   const Dialect dialect = file.frame.dialect;
   const Lines lines = file.HasLineDirectives() ? Lines::Counted : Lines::Ignored;
-  std::string old;
-  if (!ReadWholeFile(old, path)) return false;
-  const std::string text = generated.Text();
   try {
     return SameTokens(LexScanner(std::string_view(old), dialect), LexScanner(std::string_view(text), dialect), lines);
   } catch (const LexScannerException&) {
@@ -76,7 +74,10 @@ int64_t ReadingTime(const ConfigSettings& settings) {
 
 void WriteOutput(ScannedFile& file, const std::string& target, GeneratedFile& generated, int64_t readTime) {
   const ConfigSettings& settings = file.host.Settings();
-  const bool isWritten = settings.writeTokenEquivalent || !IsTokenEquivalent(target, generated, file);
+  std::string old, text;
+  const bool isCompared = !settings.writeTokenEquivalent && ReadWholeFile(old, target);
+  if (isCompared || settings.positionMaps) text = generated.Text();
+  const bool isWritten = !isCompared || !IsTokenEquivalent(old, text, file);
   if (!isWritten) {
     if (settings.diagnostics) TraceWriter() << "Token equivalent: " << target << "\n";
   } else {
@@ -85,6 +86,10 @@ void WriteOutput(ScannedFile& file, const std::string& target, GeneratedFile& ge
     generated.Commit();
   }
   if (settings.makeTranslatedFilesReadOnly) ChangeReadOnly(target, true);
+  if (settings.positionMaps) {
+    const PositionMap map = PositionMap::OfTranslation(file, text);
+    isWritten ? map.Save(target, text) : map.RealignedTo(old, text, file.frame.dialect).Save(target, old);
+  }
   file.needsWriting = false;
   SetTranslated(file, TranslationTime(target, readTime, isWritten));
 }

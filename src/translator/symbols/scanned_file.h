@@ -56,6 +56,8 @@ class TranslationHost {
   // Around the translation of a file, which has those of its imports within it.
   virtual void TranslationBegins(const ScannedFile&) {}
   virtual void TranslationEnds(const ScannedFile&) {}
+  // Takes what a translation gives that is not written; null: nobody does.
+  virtual IOutputStream* TextKeeper(const ScannedFile&) { return nullptr; }
   // With the key schemaLock: what of a model, whose file is translated, goes against what is recorded of it, empty for
   // nothing; and with which release a source defines the target of its project, at a position in its text.
   virtual bool KeepsSchemas() const { return false; }
