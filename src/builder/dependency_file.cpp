@@ -3,9 +3,9 @@
 #include <algorithm>
 #include <vector>
 
-#include "text/payload.h"
 #include "text/files.h"
 #include "text/numbers.h"
+#include "text/payload.h"
 
 namespace qrex {
 

@@ -3,8 +3,8 @@
 #include <algorithm>
 #include <cstring>
 
-#include "text/payload.h"
 #include "text/paths.h"
+#include "text/payload.h"
 #include "text/text_writer.h"
 
 namespace qrex {

@@ -14,7 +14,7 @@ namespace qrex {
 
 struct SourceLineView {
   std::string_view path;  // as messages name it; a part of the map
-  int64_t line = 0;  // 0: it came of none, as the lines of a guard
+  int64_t line = 0;       // 0: it came of none, as the lines of a guard
 };
 
 class PositionMap {
