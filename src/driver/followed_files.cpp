@@ -76,16 +76,6 @@ const TextLines& FollowedFiles::LinesOf(const std::string& path) {
   return *lines;
 }
 
-IOutputStream* FollowedFiles::KeepingFiles::TextKeeper(const ScannedFile& file) {
-  return &(m_texts[&file] = std::make_unique<KeptText>())->stream;
-}
-
-std::string FollowedFiles::KeepingFiles::TextOf(const ScannedFile& file) const {
-  std::string text;
-  m_texts.at(&file)->buffer.AppendTo(text);
-  return text;
-}
-
 // Null where the project lacks the configuration of the run.
 FollowedFiles::ReadProject* FollowedFiles::ProjectOf(Project& project) {
   const auto [entry, isNew] = m_projects.try_emplace(&project);
@@ -129,7 +119,7 @@ PositionMap FollowedFiles::MapOf(ReadProject& project, ScannedFile& file, std::s
   const auto kept = PositionMap::Load(project.files.paths.Translated(file.file), generated);
   if (kept) return *kept;
   BringUpToDate(file);
-  const std::string text = project.files.TextOf(file);
+  const std::string& text = project.files.OutputOf(file).Text();
   PositionMap map = PositionMap::OfTranslation(file, text);
   return text == generated ? map : map.RealignedTo(generated, text, file.frame.dialect);
 }

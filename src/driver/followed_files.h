@@ -10,9 +10,8 @@
 #include <string_view>
 #include <unordered_map>
 
-#include "builder/build_files.h"
+#include "builder/keeping_files.h"
 #include "builder/project_prints.h"
-#include "text/stream_adapters.h"
 #include "translator/file/position_map.h"
 #include "workspace/workspace.h"
 
@@ -50,20 +49,6 @@ class FollowedFiles {
   bool Forth(const std::string& file, int64_t line, int64_t column, FollowedPlace& place);
 
  private:
-  // Keeps the texts that translations give.
-  class KeepingFiles : public BuildFiles {
-   public:
-    using BuildFiles::BuildFiles;
-    IOutputStream* TextKeeper(const ScannedFile& file) override;
-    std::string TextOf(const ScannedFile& file) const;
-
-   private:
-    struct KeptText {
-      PagedBuffer buffer;
-      PagedBufferToOutputStreamAdapter stream{buffer};
-    };
-    std::unordered_map<const ScannedFile*, std::unique_ptr<KeptText>> m_texts;
-  };
   struct ReadProject {
     ReadProject(ConfigSettings& settings, Project& project, ProjectConfig& config) : files(settings, project, config) {}
     KeepingFiles files;

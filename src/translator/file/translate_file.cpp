@@ -4,6 +4,7 @@
 
 #include "translator/file/translate_text.h"
 #include "translator/file/translation_output.h"
+#include "translator/reader/kept_output.h"
 
 namespace qrex {
 
@@ -35,11 +36,11 @@ void ReadSource(ScannedFile& file) {
 }
 
 // The imports that were known until then.
-std::vector<ScannedFile*> Translate(ScannedFile& file, IOutputStream& target) {
+std::vector<ScannedFile*> Translate(ScannedFile& file, IOutputStream& target, KeptOutput* kept = nullptr) {
   ReadSource(file);
   std::vector<ScannedFile*> knownImports = std::exchange(file.imports, {});
   try {
-    TranslateText(file, target);
+    TranslateText(file, target, kept);
   } catch (...) {
     file.imports = std::move(knownImports);  // a part of them would hide from the next run what makes this file stale
     throw;
@@ -57,9 +58,12 @@ void TranslateAndWrite(ScannedFile& file) {
 }
 
 void MakeDeclarations(ScannedFile& file) {
-  DiscardStream discarded;
-  IOutputStream* const keeper = file.host.TextKeeper(file);
-  Translate(file, keeper ? *keeper : discarded);
+  if (KeptOutput* const keeper = file.host.TextKeeper(file)) {
+    Translate(file, *keeper, keeper);
+  } else {
+    DiscardStream discarded;
+    Translate(file, discarded);
+  }
 }
 
 void WorkOn(ScannedFile& file) {

@@ -11,6 +11,7 @@
 #include "translator/file/release_check.h"
 #include "translator/file/schema_check.h"
 #include "translator/file/tails.h"
+#include "translator/reader/kept_output.h"
 #include "translator/reader/line_directives.h"
 #include "translator/reader/qrex_parser.h"
 
@@ -27,11 +28,12 @@ std::string IncludeGuard(std::string_view path) {
   return guard;
 }
 
-void TranslateExpanded(ScannedFile& file, IOutputStream& target, TextRange expanded) {
+void TranslateExpanded(ScannedFile& file, IOutputStream& target, KeptOutput* kept, TextRange expanded) {
   const FileKind kind = file.file.kind;
   constexpr size_t kUsualLine = 32;
   file.text.lines.reserve(expanded.Size() / kUsualLine);
   QrexParserOutputStream stream(target, file.text.lines, expanded, file.text.map);
+  stream.TellCopies(kept);
   std::optional<LineDirectives> directives;
   if (file.HasLineDirectives()) stream.Use(directives.emplace(target, file, file.text.lines, expanded));
   TextWriter out(stream);
@@ -84,16 +86,16 @@ TextRange SourceOf(const ScannedFile& file) {
 
 }  // namespace
 
-void TranslateText(ScannedFile& file, IOutputStream& target) {
+void TranslateText(ScannedFile& file, IOutputStream& target, KeptOutput* kept) {
   DefinePredefinedVariables(file);
   file.text.lines.clear();
   TextRange expanded;
   try {
     Importer importer(file);
-    file.text.map.calls = file.HasLineDirectives() ? std::make_unique<std::vector<SourceMap::Call>>() : nullptr;
+    file.text.map.calls = file.HasLineDirectives() || kept ? std::make_unique<std::vector<SourceMap::Call>>() : nullptr;
     expanded = ExpandWithMap(&importer, file.frame, SourceOf(file), 0, 0, file.text.expanded, file.text.map);
     file.place = file.host.Symbols().NextPlace();
-    TranslateExpanded(file, target, expanded);
+    TranslateExpanded(file, target, kept, expanded);
   } catch (LexScannerException& exception) {
     MapErrorPosition(file.text.map, expanded, exception);
     if (exception.file.empty() && exception.position) {

@@ -6,7 +6,8 @@
 
 namespace qrex {
 
-// Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`.
-void TranslateText(ScannedFile& file, IOutputStream& target);
+// Runs the macro pass and the main loop over the file's source text, with head, tails and foot, into `target`. `kept`:
+// the target, if it is to know what is copied.
+void TranslateText(ScannedFile& file, IOutputStream& target, KeptOutput* kept = nullptr);
 
 }  // namespace qrex

@@ -8,6 +8,7 @@
 #include "platform/system.h"
 #include "text/paths.h"
 #include "translator/reader/cpp_words.h"
+#include "translator/reader/kept_output.h"
 #include "translator/reader/line_directives.h"
 #include "translator/types/type_code.h"
 
@@ -43,6 +44,7 @@ void QrexParserOutputStream::CopyRange(const char* begin, const char* end) {
     m_copied = end;
     return m_directives->WriteCopied(begin, end);
   }
+  if (m_kept) m_kept->WillCopy({begin, end});
   m_target.Write(begin, static_cast<size_t>(end - begin));
   while (const void* newline = std::memchr(begin, '\n', static_cast<size_t>(end - begin))) {
     m_copied = static_cast<const char*>(newline);

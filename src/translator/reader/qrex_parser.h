@@ -28,6 +28,7 @@
 namespace qrex {
 
 class ClassDef;
+class KeptOutput;
 class LineDirectives;
 
 // Receives the generated text, and keeps for each generated line the source position that it came from: that of the
@@ -38,6 +39,7 @@ class QrexParserOutputStream : public IOutputStream {
                          const SourceMap& map);
   // From here on the output goes through these, which are not owned and keep the line table.
   void Use(LineDirectives& directives) { m_directives = &directives; }
+  void TellCopies(KeptOutput* kept) { m_kept = kept; }  // the target, if that wants to know; or null
   void Write(const void* data, size_t length) override;  // generated text
   void WriteIndented(std::string_view text, size_t blanks, bool atLineStart) override;
   void Flush() override;
@@ -50,6 +52,7 @@ class QrexParserOutputStream : public IOutputStream {
   void AddLines(std::string_view text);  // of generated text to the line table
   IOutputStream& m_target;
   LineDirectives* m_directives = nullptr;
+  KeptOutput* m_kept = nullptr;
   std::vector<const char*>& m_lineTable;
   TextRange m_expanded;
   const SourceMap& m_map;

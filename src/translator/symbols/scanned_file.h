@@ -18,6 +18,7 @@ namespace qrex {
 
 class ScannedFile;
 class ClassDef;
+class KeptOutput;
 
 // The qualified names that each .cpp file registers, by path.
 struct DeclarationRegistry {
@@ -57,7 +58,7 @@ class TranslationHost {
   virtual void TranslationBegins(const ScannedFile&) {}
   virtual void TranslationEnds(const ScannedFile&) {}
   // Takes what a translation gives that is not written; null: nobody does.
-  virtual IOutputStream* TextKeeper(const ScannedFile&) { return nullptr; }
+  virtual KeptOutput* TextKeeper(const ScannedFile&) { return nullptr; }
   // With the key schemaLock: what of a model, whose file is translated, goes against what is recorded of it, empty for
   // nothing; and with which release a source defines the target of its project, at a position in its text.
   virtual bool KeepsSchemas() const { return false; }
