@@ -42,6 +42,9 @@ class BuildFiles : public TranslationHost {
   DeclarationRegistry& UnregisterMap() override { return unregisterMap; }
   SymbolIndex& Symbols() override { return m_symbols; }
   size_t NextFileIndex() override { return m_nextFileIndex++; }
+  // A pass behind the first: these files and all that import them are taken back, and are what it gives; what failed
+  // begins anew, and the rest is kept.
+  std::vector<ScannedFile*> BeginPass(const std::vector<ScannedFile*>& changed);
   size_t FileCount() const { return m_nextFileIndex; }  // above each file's index
   std::vector<const ScannedFile*> FilesOfProject() const override;
   void Tell(const Message& message) override;

@@ -8,7 +8,7 @@ namespace qrex {
 
 namespace {
 
-std::vector<ScannedFile*> AllFiles(const ProjectBuilder& builder) {
+std::vector<ScannedFile*> AllFiles(const BuildFiles& builder) {
   std::vector<ScannedFile*> files;
   files.reserve(builder.scannedByPath.size());
   for (const auto& [path, file] : builder.scannedByPath) files.push_back(file.get());
@@ -17,15 +17,10 @@ std::vector<ScannedFile*> AllFiles(const ProjectBuilder& builder) {
 
 }  // namespace
 
-void ProjectBuilder::BeginPass(const std::vector<ProjectFile*>& changed) {
+std::vector<ScannedFile*> BuildFiles::BeginPass(const std::vector<ScannedFile*>& changed) {
   const std::vector<ScannedFile*> all = AllFiles(*this);
-  std::vector<ScannedFile*> stale;
-  for (ProjectFile* file : changed) stale.push_back(&GetScannedFile(*file));
-  const auto write = [this](ScannedFile* file) { file->needsWriting = file->file.project == &project; };
-  std::for_each(stale.begin(), stale.end(), write);
-  const std::vector<ScannedFile*> taken = TakeBack(stale, all);
-  std::for_each(taken.begin(), taken.end(), write);
-  Symbols().BeginPass();
+  std::vector<ScannedFile*> taken = TakeBack(changed, all);
+  m_symbols.BeginPass();
   settings.faulty.clear();
   for (ScannedFile* file : all) {
     if (file->state == TranslationState::Failed) file->TakeBack();
@@ -33,6 +28,16 @@ void ProjectBuilder::BeginPass(const std::vector<ProjectFile*>& changed) {
     file->place = 0;
     file->tail.isRegistered = false;
   }
+  return taken;
+}
+
+void ProjectBuilder::BeginPass(const std::vector<ProjectFile*>& changed) {
+  std::vector<ScannedFile*> stale;
+  for (ProjectFile* file : changed) stale.push_back(&GetScannedFile(*file));
+  const auto write = [this](ScannedFile* file) { file->needsWriting = file->file.project == &project; };
+  std::for_each(stale.begin(), stale.end(), write);
+  const std::vector<ScannedFile*> taken = BuildFiles::BeginPass(stale);
+  std::for_each(taken.begin(), taken.end(), write);
   m_hasStaleFiles = true;
 }
 

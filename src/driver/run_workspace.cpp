@@ -408,6 +408,14 @@ bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded) {
   return observers.End(run->IsCompleted(), isLoaded ? &run->Loaded() : nullptr) && succeeded;
 }
 
+std::shared_ptr<Workspace> LoadToAsk(ConfigSettings& settings) {
+  if (!CheckPathSyntax(settings)) return nullptr;
+  const auto run = std::make_shared<WorkspaceRun>(settings, LoadedTo::Ask);
+  run->LoadAll();
+  run->Loaded().SortProjects();
+  return {run, &run->Loaded()};
+}
+
 bool ListWorkspace(ConfigSettings& settings, std::string& list) {
   if (!CheckPathSyntax(settings)) return false;
   WorkspaceRun run(settings, LoadedTo::Ask);

@@ -7,7 +7,7 @@
 
 #include "driver/question.h"
 #include "driver/where.h"
-#include "workspace/config_settings.h"
+#include "workspace/workspace.h"
 
 namespace qrex {
 
@@ -16,6 +16,9 @@ namespace qrex {
 // `loaded`, unless null, gets all that the run made, for a caller that ends soon: to take a large workspace apart would
 // cost a tenth of the run.
 bool RunWorkspace(ConfigSettings& settings, std::shared_ptr<void>* loaded = nullptr);
+
+// Loads the same for who asks about it, as far as that is possible; null, with messages told, where it is not.
+std::shared_ptr<Workspace> LoadToAsk(ConfigSettings& settings);
 
 // Loads the same, and tells of it in the form of driver/listing.h. False, with a message, where something cannot be
 // loaded.

@@ -12,7 +12,7 @@
 
 namespace qrex {
 
-const Directive* Directive::Find(std::string_view word) {
+std::span<const Directive> Directive::All() {
   using C = ExpansionContext;
   static const Directive kDirectives[] = {
       {"if", Line::Kept, &C::If},
@@ -41,7 +41,11 @@ const Directive* Directive::Find(std::string_view word) {
       {"defpython", Line::DroppedWhole, &C::DefPython},
       {"runpython", Line::DroppedWhole, &C::RunPython},
   };
-  for (const Directive& directive : kDirectives) {
+  return kDirectives;
+}
+
+const Directive* Directive::Find(std::string_view word) {
+  for (const Directive& directive : All()) {
     if (directive.word == word) return &directive;
   }
   return nullptr;

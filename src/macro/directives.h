@@ -1,6 +1,7 @@
 // The words behind `@`, and how each treats the line that it is on.
 #pragma once
 
+#include <span>
 #include <string_view>
 
 #include "macro/expansion_context.h"
@@ -19,6 +20,7 @@ struct Directive {
   void (ExpansionContext::*run)();
   void Run(ExpansionContext& context) const { (context.*run)(); }
 
+  static std::span<const Directive> All();
   static const Directive* Find(std::string_view word);
 };
 

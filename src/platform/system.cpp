@@ -108,6 +108,10 @@ std::optional<std::string> EnvironmentValue(const char* name) {
 
 void SetEnvironment(const std::string& name, const std::string& value) { setenv(name.c_str(), value.c_str(), 1); }
 
+bool GoToFolder(const std::string& path) { return chdir(path.c_str()) == 0; }
+
+void EndAtOnce(int status) { _exit(status); }
+
 WorkingFolder::WorkingFolder() : m_descriptor(open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
 
 WorkingFolder::~WorkingFolder() {

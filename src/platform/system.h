@@ -32,6 +32,9 @@ class WorkingFolder {
   const int m_descriptor;
 };
 
+bool GoToFolder(const std::string& path);  // the process works there from then on
+[[noreturn]] void EndAtOnce(int status);   // whatever other threads wait for
+
 // Of this program, with symbolic links resolved. Where the system does not tell, it is found by the first word of its
 // command line: a path, or a name on PATH; empty: not found.
 std::string ProgramPath(const std::string& calledAs);

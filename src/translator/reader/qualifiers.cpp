@@ -7,7 +7,7 @@
 
 namespace qrex {
 
-const QualifierWord* FindQualifierWord(std::string_view word) {
+std::span<const QualifierWord> QualifierWords() {
   using Q = ClassQualifiers;
   static constexpr QualifierWord kWords[] = {
       {"dc", &Q::dc, true, false},
@@ -26,9 +26,14 @@ const QualifierWord* FindQualifierWord(std::string_view word) {
       {"genop", &Q::genop, false, false},
       {"rod", &Q::rod, false, false},
   };
-  const auto* found = std::find_if(std::begin(kWords), std::end(kWords),
-                                   [&](const QualifierWord& candidate) { return candidate.word == word; });
-  return found == std::end(kWords) ? nullptr : found;
+  return kWords;
+}
+
+const QualifierWord* FindQualifierWord(std::string_view word) {
+  const std::span<const QualifierWord> words = QualifierWords();
+  const auto found =
+      std::find_if(words.begin(), words.end(), [&](const QualifierWord& candidate) { return candidate.word == word; });
+  return found == words.end() ? nullptr : &*found;
 }
 
 bool ParseQualifierList(QrexParser& parser, ClassDef& def) {

@@ -1,0 +1,296 @@
+// What the editor has open: its texts, what comes of them, and what is told of it.
+#include <algorithm>
+
+#include "driver/compile_commands.h"
+#include "platform/file_system.h"
+#include "platform/system.h"
+#include "server/server.h"
+#include "text/files.h"
+#include "text/paths.h"
+
+namespace qrex::server {
+
+namespace {
+
+constexpr int kError = 1, kWarning = 2;  // severities, and types of messages
+
+bool IsProjectPath(const std::string& path) {
+  return HasExtension(path, "qrex") || HasExtension(path, "qrws") || HasExtension(path, "qrpj") ||
+         HasExtension(path, "inc");
+}
+
+// The configuration beside or above the path. Of several in a folder the first without a further dot.
+std::string FindConfiguration(std::string path) {
+  for (size_t slash; (slash = path.rfind('/')) != std::string::npos && slash > 0;) {
+    path.resize(slash);
+    std::vector<std::string> found = platform::PlainFileNames(path + "/");
+    std::erase_if(found, [](const std::string& name) { return !HasExtension(name, "qrex"); });
+    std::sort(found.begin(), found.end(), [](const std::string& a, const std::string& b) {
+      return std::pair(std::count(a.begin(), a.end(), '.'), a) < std::pair(std::count(b.begin(), b.end(), '.'), b);
+    });
+    if (!found.empty()) return path + "/" + found.front();
+  }
+  return {};
+}
+
+std::string FolderOf(const std::string& path) { return path.substr(0, path.rfind('/')); }
+
+// The path by which the tool reads it: from the folder that it works in, or absolute.
+std::string ToolPath(const std::string& path, const std::string& folder) {
+  return path.starts_with(folder + "/") ? path.substr(folder.size() + 1) : path;
+}
+
+std::string CacheFolder(const std::string& configuration) {
+  const auto cache = platform::EnvironmentValue("XDG_CACHE_HOME");
+  const auto home = platform::EnvironmentValue("HOME");
+  const std::string base = cache && !cache->empty() ? *cache : home.value_or("/tmp") + "/.cache";
+  return base + "/qrex-lsp/" + std::to_string(Crc32(configuration));
+}
+
+}  // namespace
+
+// --- The workspace
+
+void Server::LoadWorldFor(const std::string& path) {
+  if (m_world) return;
+  if (m_configuration.empty()) m_configuration = FindConfiguration(path);
+  if (m_configuration.empty() && !m_rootFolder.empty()) m_configuration = FindConfiguration(m_rootFolder + "/.");
+  if (!m_configuration.empty()) LoadWorld();
+}
+
+void Server::LoadWorld() {
+  m_mustReload = false;
+  platform::GoToFolder(FolderOf(m_configuration));
+  for (auto& [uri, document] : m_documents) document.file = nullptr;
+  m_changed.clear();
+  m_checkedImports.clear();
+  const std::set<std::string> touched = m_world ? m_world->TakeTouched() : std::set<std::string>();
+  m_own.reset();
+  m_mapping.reset();
+  m_world = std::make_unique<SourceWorld>(m_texts);
+  m_mapping = std::make_unique<Mapping>(*m_world);
+  m_mapping->columns = m_columns;
+  m_own = std::make_unique<OwnLanguage>(*m_world, *m_mapping);
+  const std::string name = ToolPath(m_configuration, FolderOf(m_configuration));
+  if (!m_world->Load(name, m_lines, m_program)) Log(kError, "cannot load " + m_configuration);
+  for (auto& [uri, document] : m_documents) {
+    m_texts.Lay(ToolPath(document.path, FolderOf(m_configuration)), document.text.Text());
+    if (m_world->IsLoaded()) document.file = m_world->FindFile(document.path);
+    if (document.file) m_changed.insert(document.file);
+  }
+  if (m_world->IsLoaded() && !m_clangd) StartClangd();
+}
+
+// The commands stand in a folder of our own: clangd keeps its index there, and the tree is not written to.
+void Server::StartClangd() {
+  if (m_clangdWords.front().empty()) return;
+  const std::string folder = FolderOf(m_configuration), cache = CacheFolder(m_configuration);
+  std::string present;
+  const std::string commands = CompileCommandsOf(m_world->Loaded(), folder), file = cache + "/compile_commands.json";
+  CreateDirectories(file, false);
+  if (!ReadWholeFile(present, file) || present != commands) ReplaceFile(file, commands);
+  std::string program;
+  for (const std::string& name : m_clangdWords) {
+    if (program.empty() && (name.find('/') != std::string::npos || !platform::FindProgram(name).empty()))
+      program = name;
+  }
+  if (program.empty()) return Log(kWarning, "clangd is not installed: C++ itself is not known", true);
+  m_clangd = std::make_unique<Clangd>(
+      std::vector<std::string>{program, "--compile-commands-dir=" + cache, "--use-dirty-headers", "--log=error",
+                               "--header-insertion=never"},
+      folder, [this](int generation, std::optional<std::string> body) {
+        m_mailbox.Put({false, generation, std::move(body)});
+      });
+}
+
+// --- Documents
+
+bool Server::IsProjectText(const Document& document) const { return IsProjectPath(document.path); }
+
+Server::Document* Server::FindDocument(const Json& params) {
+  const auto found = m_documents.find(TextAt(params, "textDocument/uri"));
+  return found == m_documents.end() ? nullptr : &found->second;
+}
+
+void Server::Open(const Json& params) {
+  const std::string uri = TextAt(params, "textDocument/uri");
+  const std::string path = PathOfUri(uri);
+  if (path.empty()) return;
+  Document& document = m_documents[uri] = Document();
+  document.uri = uri;
+  document.path = path;
+  document.language = TextAt(params, "textDocument/languageId");
+  document.version = NumberAt(params, "textDocument/version");
+  document.text = TextIndex(TextAt(params, "textDocument/text"));
+  LoadWorldFor(path);
+  if (m_world && m_world->IsLoaded()) document.file = m_world->FindFile(path);
+  TextChanged(document);
+}
+
+void Server::Change(const Json& params) {
+  Document* const document = FindDocument(params);
+  if (!document) return;
+  document->version = NumberAt(params, "textDocument/version", document->version);
+  for (const Json& change : At(params, "contentChanges")) {
+    const std::string text = TextAt(change, "text");
+    const Json& range = At(change, "range");
+    if (range.is_null()) {
+      document->text = TextIndex(text);
+      continue;
+    }
+    std::string whole = document->text.Text();
+    const size_t begin = document->text.OffsetOf(PositionFrom(At(range, "start")), m_columns);
+    const size_t end = document->text.OffsetOf(PositionFrom(At(range, "end")), m_columns);
+    whole.replace(begin, end > begin ? end - begin : 0, text);
+    document->text = TextIndex(std::move(whole));
+  }
+  TextChanged(*document);
+}
+
+void Server::TextChanged(Document& document) {
+  if (!m_world) return;
+  m_texts.Lay(ToolPath(document.path, FolderOf(m_configuration)), document.text.Text());
+  if (document.file) m_changed.insert(document.file);
+  if (IsProjectText(document)) m_mustReload = true;
+}
+
+void Server::Close(const Json& params) {
+  Document* const document = FindDocument(params);
+  if (!document) return;
+  const std::string path = document->path;
+  ProjectFile* const file = document->file;
+  if (m_clangd && m_world && file) m_clangd->Hide(m_world->GeneratedPathOf(*file));
+  Tell("textDocument/publishDiagnostics", {{"uri", document->uri}, {"diagnostics", Json::array()}});
+  m_mustReload = m_mustReload || IsProjectText(*document);
+  m_documents.erase(document->uri);
+  if (m_world) m_texts.Lift(ToolPath(path, FolderOf(m_configuration)));
+  if (file) m_changed.insert(file);  // the disk counts again
+}
+
+// On the disk: of what is open, the editor's text counts.
+void Server::Saved(const std::string& path) {
+  if (!m_world || path.empty()) return;
+  if (IsProjectPath(path)) m_mustReload = true;
+  if (!m_world->IsLoaded() || m_documents.contains(UriOfPath(path))) return;
+  if (ProjectFile* const file = m_world->FindFile(path)) m_changed.insert(file);
+}
+
+// --- Translation
+
+void Server::BringUpToDate() {
+  if (m_mustReload && m_world) LoadWorld();
+  if (!m_world || !m_world->IsLoaded()) return PublishTouched();
+  std::set<ProjectFile*> headers;
+  for (ProjectFile* file : m_changed) {
+    m_world->Changed(*file);
+    if (file->kind == FileKind::H) headers.insert(file);
+  }
+  const bool hasChanged = !m_changed.empty();
+  m_changed.clear();
+  if (hasChanged) {
+    if (!headers.empty()) m_checkedImports.clear();
+    for (auto& [uri, document] : m_documents) {
+      if (document.file) ShowToClangd(document);
+    }
+    for (auto& [uri, document] : m_documents) {
+      if (document.file) ShowImports(document);
+    }
+    for (ProjectFile* header : headers) {
+      if (m_clangd) m_clangd->TellSaved(m_world->GeneratedPathOf(*header));
+    }
+  }
+  PublishTouched();
+}
+
+void Server::ShowToClangd(Document& document) {
+  const TextIndex& generated = m_world->TranslationOf(*document.file).generated;
+  if (m_clangd)
+    m_clangd->Show(m_world->GeneratedPathOf(*document.file), generated.Text(), document.file->kind != FileKind::C);
+  if (document.isShown) Tell("qrex/generatedChanged", {{"uri", document.uri}, {"text", generated.Text()}});
+}
+
+// What it imports is read from the disk where it stands there as it would be made now.
+void Server::ShowImports(Document& document) {
+  if (!m_clangd) return;
+  for (ProjectFile* import : m_world->ImportsOf(*document.file)) {
+    if (!m_checkedImports.insert(import).second) continue;
+    const std::string path = m_world->GeneratedPathOf(*import);
+    if (m_documents.contains(m_mapping->SourceUri(*import))) continue;
+    const Translated& translated = m_world->TranslationOf(*import);
+    std::string present;
+    const bool isThere = LoadText(present, path, true) && present == translated.generated.Text();
+    if (isThere || translated.generated.Text().empty()) {
+      m_clangd->Hide(path);
+    } else {
+      m_clangd->Show(path, translated.generated.Text(), true);
+    }
+  }
+}
+
+// --- Diagnostics
+
+Json Server::DiagnosticsOf(Document& document) {
+  Json all = Json::array();
+  const std::string path =
+      document.file ? SourceWorld::SourcePathOf(*document.file) : ToolPath(document.path, FolderOf(m_configuration));
+  for (const Message& message : m_world->MessagesOf(path)) {
+    const bool isPlaced = message.place.begin >= 0;
+    size_t begin = isPlaced ? static_cast<size_t>(message.place.begin) : 0;
+    if (!isPlaced && message.place.line > 0) {
+      begin = document.text.OffsetOf({message.place.line - 1, 0}, m_columns);
+    }
+    size_t end = message.place.end > message.place.begin ? static_cast<size_t>(message.place.end) : begin + 1;
+    Json one = {{"range", RangeJson(document.text, begin, end, m_columns)},
+                {"severity", message.severity == Severity::Error ? kError : kWarning},
+                {"source", "qrex"},
+                {"message", message.text}};
+    if (message.code != 0) one["code"] = message.code;
+    for (const std::string& hint : message.hints) {
+      if (!hint.empty()) one["message"] = TextAt(one, "message") + "\nhint: " + hint;
+    }
+    all.push_back(std::move(one));
+  }
+  if (!document.file) return all;
+  for (const Json& diagnostic : document.clangdDiagnostics) {
+    Json one = diagnostic;
+    one["range"] = m_mapping->RangeOf(*document.file, m_mapping->ToSource(*document.file, At(diagnostic, "range")));
+    one.erase("relatedInformation");
+    for (const Json& related : At(diagnostic, "relatedInformation")) {
+      one["relatedInformation"].push_back(
+          {{"location", m_mapping->Locations(At(related, "location"))}, {"message", TextAt(related, "message")}});
+    }
+    if (std::find(all.begin(), all.end(), one) == all.end()) all.push_back(std::move(one));
+  }
+  return all;
+}
+
+void Server::Publish(Document& document) {
+  Tell("textDocument/publishDiagnostics",
+       {{"uri", document.uri}, {"version", document.version}, {"diagnostics", DiagnosticsOf(document)}});
+}
+
+void Server::PublishTouched() {
+  if (!m_world) return;
+  for (const std::string& touched : m_world->TakeTouched()) {
+    std::string full;
+    FullPathOf(touched, full);
+    const auto open = m_documents.find(UriOfPath(CollapseDots(full)));
+    if (open != m_documents.end()) {
+      Publish(open->second);
+    } else if (touched.empty()) {
+      for (const Message& message : m_world->MessagesOf(touched)) Log(kError, message.text);
+    }
+  }
+}
+
+void Server::FromClangd(const Json& message) {
+  if (TextAt(message, "method") != "textDocument/publishDiagnostics" || !m_world || !m_world->IsLoaded()) return;
+  const ProjectFile* const file = m_mapping->FileAt(TextAt(message, "params/uri"));
+  for (auto& [uri, document] : m_documents) {
+    if (!file || document.file != file) continue;
+    document.clangdDiagnostics = At(message, "params/diagnostics");
+    Publish(document);
+  }
+}
+
+}  // namespace qrex::server

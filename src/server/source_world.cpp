@@ -1,0 +1,209 @@
+#include "server/source_world.h"
+
+#include <algorithm>
+
+#include "driver/config_parser.h"
+#include "driver/data_folder.h"
+#include "driver/run_workspace.h"
+#include "text/files.h"
+#include "text/paths.h"
+#include "text/trace.h"
+#include "translator/file/translate_file.h"
+
+namespace qrex::server {
+
+namespace {
+
+std::string FullPath(const std::string& path) {
+  std::string full;
+  FullPathOf(path, full);
+  return CollapseDots(full);
+}
+
+// What @print and the like say goes nowhere: standard output belongs to the protocol.
+class HeldTrace {
+ public:
+  HeldTrace() { HoldTrace(&m_told); }
+  ~HeldTrace() { HoldTrace(nullptr); }
+  HeldTrace(const HeldTrace&) = delete;
+  HeldTrace& operator=(const HeldTrace&) = delete;
+  const std::string& Told() const { return m_told; }
+
+ private:
+  const QuietConsole m_quiet;
+  std::string m_told;
+};
+
+std::string SettingsText(const std::vector<std::string>& lines) {
+  std::string text;
+  for (const std::string& line : lines) text += line + "\n";
+  return text;
+}
+
+}  // namespace
+
+SourceWorld::~SourceWorld() { m_projects.clear(); }
+
+bool SourceWorld::Load(const std::string& configuration, const std::vector<std::string>& lines,
+                       const std::string& program) {
+  const HeldTrace held;
+  m_settings = std::make_unique<ConfigSettings>();
+  m_settings->macroWorld.sources = &m_texts;
+  m_settings->macroWorld.messages = this;
+  m_settings->keepGoing = true;
+  try {
+    if (!LoadConfiguration(*m_settings, configuration, SettingsText(lines))) return false;
+    std::string problem = ValidateSettings(*m_settings);
+    if (problem.empty()) problem = AddRuntimeRoot(*m_settings, program);
+    if (!problem.empty()) {
+      Take(Message(Severity::Error, "Error: ", problem).At({configuration, 1, 0, 0}));
+      return false;
+    }
+    m_settings->lineDirectives = false;  // positions are mapped by character
+    m_settings->positionMaps = false;
+    m_settings->keepGoing = true;
+    m_workspace = LoadToAsk(*m_settings);
+  } catch (const IException& exception) {
+    Take(ErrorOf(exception));
+  }
+  if (!m_workspace) return false;
+  for (const auto& [path, file] : m_workspace->fileMap) {
+    m_bySource.emplace(SourceFullPathOf(*file), file);
+    if (const ProjectConfig* config = file->project->FindConfig(m_settings->config, m_settings->platform)) {
+      if (IsTranslated(*file->project) && IsTranslated(*file)) {
+        m_byGenerated.emplace(FullPath(PathJoin(TranslationDirectory(*config), file->path)), file);
+      }
+    }
+  }
+  return true;
+}
+
+std::string SourceWorld::SourcePathOf(const ProjectFile& file) { return file.project->SourcePath(file); }
+
+std::string SourceWorld::SourceFullPathOf(const ProjectFile& file) { return FullPath(SourcePathOf(file)); }
+
+std::string SourceWorld::GeneratedPathOf(const ProjectFile& file) const {
+  const ProjectConfig* const config = file.project->FindConfig(m_settings->config, m_settings->platform);
+  if (!config || !IsTranslated(*file.project) || !IsTranslated(file)) return FullPath(SourcePathOf(file));
+  return FullPath(PathJoin(TranslationDirectory(*config), file.path));
+}
+
+ProjectFile* SourceWorld::FindFile(const std::string& path) const {
+  const auto found = m_bySource.find(path);
+  return found == m_bySource.end() ? nullptr : found->second;
+}
+
+ProjectFile* SourceWorld::FindGenerated(const std::string& path) const {
+  const auto found = m_byGenerated.find(path);
+  return found == m_byGenerated.end() ? nullptr : found->second;
+}
+
+// --- Messages
+
+void SourceWorld::Take(const Message& message) {
+  if (message.severity == Severity::Note) return;  // it belongs to one that is told as well
+  m_messages[message.place.file].push_back(message);
+  m_touched.insert(message.place.file);
+}
+
+void SourceWorld::ForgetMessages(const std::string& path) {
+  if (m_messages.erase(path) > 0) m_touched.insert(path);
+}
+
+const std::vector<Message>& SourceWorld::MessagesOf(const std::string& path) const {
+  static const std::vector<Message> kNone;
+  const auto found = m_messages.find(path);
+  return found == m_messages.end() ? kNone : found->second;
+}
+
+std::set<std::string> SourceWorld::TakeTouched() { return std::exchange(m_touched, {}); }
+
+// --- Translations
+
+KeepingFiles* SourceWorld::FilesOf(Project& project) {
+  const auto [entry, isNew] = m_projects.try_emplace(&project);
+  ProjectConfig* const config = isNew ? project.FindConfig(m_settings->config, m_settings->platform) : nullptr;
+  if (config) {
+    project.CollectFiles();
+    entry->second = std::make_unique<KeepingFiles>(*m_settings, project, *config);
+    KeepingFiles& files = *entry->second;
+    for (ProjectFile* file : project.files) files.scanned.push_back(&files.GetScannedFile(*file));
+  }
+  return entry->second.get();
+}
+
+void SourceWorld::Changed(ProjectFile& changed) {
+  m_current.erase(&changed);
+  ForgetMessages(SourcePathOf(changed));
+  for (const auto& [project, files] : m_projects) {
+    if (!files) continue;
+    const auto found = files->scannedByPath.find(changed.path);
+    if (found == files->scannedByPath.end()) continue;
+    for (ScannedFile* file : files->BeginPass({found->second.get()})) {
+      m_current.erase(&file->file);
+      ForgetMessages(file->SourcePath());
+    }
+    std::erase_if(m_current, [&](const ProjectFile* file) {  // what failed has been taken back, too
+      const auto scanned = files->scannedByPath.find(file->path);
+      const bool isGone = scanned != files->scannedByPath.end() && !scanned->second->HasBegun() &&
+                          IsTranslatedKind(file->kind) && file->project == project;
+      if (isGone) ForgetMessages(SourcePathOf(*file));
+      return isGone;
+    });
+  }
+}
+
+ScannedFile* SourceWorld::ScannedOf(ProjectFile& file) {
+  KeepingFiles* const files = FilesOf(*file.project);
+  if (!files) return nullptr;
+  TranslationOf(file);
+  return &files->GetScannedFile(file);
+}
+
+const Translated& SourceWorld::TranslationOf(ProjectFile& file) {
+  std::unique_ptr<Translated>& slot = m_translated[&file];
+  if (!slot) slot = std::make_unique<Translated>();
+  if (m_current.insert(&file).second) Translate(file, *slot);
+  return *slot;
+}
+
+void SourceWorld::Translate(ProjectFile& file, Translated& translated) {
+  const HeldTrace held;
+  std::string source;
+  m_texts.Read(source, SourcePathOf(file), SourceTexts::Form::File);
+  translated.source = TextIndex(source);
+  KeepingFiles* const files = FilesOf(*file.project);
+  const bool isCopied = !files || !IsTranslated(*file.project) || !IsTranslated(file) || !IsTranslatedKind(file.kind);
+  translated.isFaulty = false;
+  if (isCopied) {
+    translated.generated = translated.madeFrom = translated.source;
+    translated.map = CharacterMap::OfCopy(source.size());
+    return;
+  }
+  ScannedFile& scanned = files->GetScannedFile(file);
+  try {
+    BringUpToDate(scanned);
+    const KeptOutput& output = files->OutputOf(scanned);
+    translated.generated = TextIndex(output.Text());
+    translated.madeFrom = translated.source;
+    translated.map = CharacterMap::OfTranslation(scanned, output);
+  } catch (const FaultyFileException&) {
+    translated.isFaulty = true;
+  } catch (const IException& exception) {
+    translated.isFaulty = true;
+    Take(ErrorOf(exception));
+  }
+}
+
+std::vector<ProjectFile*> SourceWorld::ImportsOf(ProjectFile& file) {
+  std::vector<ProjectFile*> imports;
+  KeepingFiles* const files = FilesOf(*file.project);
+  if (!files) return imports;
+  const ScannedFile& asked = files->GetScannedFile(file);
+  for (const auto& [path, scanned] : files->scannedByPath) {
+    if (scanned.get() != &asked && asked.importClosure.Has(scanned->index)) imports.push_back(&scanned->file);
+  }
+  return imports;
+}
+
+}  // namespace qrex::server

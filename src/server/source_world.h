@@ -1,0 +1,77 @@
+// A workspace as the server sees it: loaded once, its files translated in memory from the texts of the editor or the
+// disk. The process stays in the folder of the configuration, where a run would be. Nothing is written.
+#pragma once
+
+#include <map>
+#include <memory>
+#include <set>
+#include <string>
+#include <unordered_map>
+#include <vector>
+
+#include "builder/keeping_files.h"
+#include "server/character_map.h"
+#include "server/text_index.h"
+#include "text/source_texts.h"
+#include "workspace/workspace.h"
+
+namespace qrex::server {
+
+// What is known of a file that was translated, or is copied.
+struct Translated {
+  TextIndex source, generated;  // the generated text is the last one that could be made
+  TextIndex madeFrom;           // of which source: another one while there are errors
+  CharacterMap map;             // of these two
+  bool isFaulty = false;
+};
+
+class SourceWorld : private MessageConsumer {
+ public:
+  // Texts in memory are laid over those of the disk by their paths as the tool has them.
+  explicit SourceWorld(OverlaidTexts& texts) : m_texts(texts) {}
+  ~SourceWorld() override;
+
+  // Loads the configuration, whose path has a folder that the process has gone to, with further lines of settings.
+  // False: what it says is among the messages.
+  bool Load(const std::string& configuration, const std::vector<std::string>& lines, const std::string& program);
+  bool IsLoaded() const { return m_workspace != nullptr; }
+  const ConfigSettings& Settings() const { return *m_settings; }
+  Workspace& Loaded() { return *m_workspace; }
+
+  ProjectFile* FindFile(const std::string& path) const;       // by the absolute path of the source; or null
+  ProjectFile* FindGenerated(const std::string& path) const;  // by that of its translation
+  static std::string SourcePathOf(const ProjectFile& file);   // as messages name it
+  static std::string SourceFullPathOf(const ProjectFile& file);
+  std::string GeneratedPathOf(const ProjectFile& file) const;  // absolute; of a file that is not translated, its source
+
+  // Takes back what the file has declared, and all that imports it: they are translated anew when they are asked for.
+  void Changed(ProjectFile& file);
+  const Translated& TranslationOf(ProjectFile& file);
+  ScannedFile* ScannedOf(ProjectFile& file);  // in its own project, translated if that is possible; or null
+  std::vector<ProjectFile*> ImportsOf(ProjectFile& file);  // of all it sees, as far as is known
+
+  // By path, as messages name files. Those without a place are under "".
+  const std::vector<Message>& MessagesOf(const std::string& path) const;
+  std::set<std::string> TakeTouched();  // paths whose messages have changed since it was asked last
+
+ private:
+  struct OwnProject {
+    std::unique_ptr<KeepingFiles> files;
+  };
+  void Take(const Message& message) override;
+  KeepingFiles* FilesOf(Project& project);
+  void Translate(ProjectFile& file, Translated& translated);
+  void ForgetMessages(const std::string& path);
+
+  OverlaidTexts& m_texts;
+  std::unique_ptr<ConfigSettings> m_settings;
+  std::shared_ptr<Workspace> m_workspace;
+  std::unordered_map<const Project*, std::unique_ptr<KeepingFiles>> m_projects;  // null: lacks the configuration
+  std::unordered_map<const ProjectFile*, std::unique_ptr<Translated>> m_translated;
+  std::set<const ProjectFile*> m_current;  // of these, what is still so
+  std::map<std::string, std::vector<Message>> m_messages;
+  std::set<std::string> m_touched;
+  std::unordered_map<std::string, ProjectFile*> m_bySource, m_byGenerated;
+};
+
+}  // namespace qrex::server

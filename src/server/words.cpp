@@ -1,0 +1,166 @@
+// Completion of our words, colours and folds: what a text alone tells.
+#include <algorithm>
+#include <array>
+#include <string>
+#include <string_view>
+
+#include "driver/config_keys.h"
+#include "lex/scanner.h"
+#include "macro/directives.h"
+#include "server/own_language.h"
+#include "text/paths.h"
+#include "translator/file/keywords.h"
+#include "translator/reader/qualifiers.h"
+
+namespace qrex::server {
+
+namespace {
+
+// Of the completion kinds of the protocol.
+constexpr int kKeyword = 14, kProperty = 10;
+
+void AddWord(Json& items, std::string_view word, int kind, std::string_view help = {}) {
+  Json item = {{"label", word}, {"kind", kind}};
+  if (!help.empty()) item["detail"] = help;
+  if (std::find(items.begin(), items.end(), item) == items.end()) items.push_back(std::move(item));
+}
+
+// Behind `<<` on the same line, with nothing but words and signs between.
+bool IsInQualifiers(std::string_view text, size_t at) {
+  while (at > 0) {
+    const char c = text[--at];
+    if (c == '<') return at > 0 && text[at - 1] == '<';
+    if (!IsWordByte(c) && c != ' ' && c != '-') return false;
+  }
+  return false;
+}
+
+constexpr std::string_view kProjectWords[] = {"qrex",    "config", "subproj", "directories", "toolfiles",
+                                              "general", "export", "exclude", "src",         "cpp",
+                                              "rc",      "link",   "as"};
+
+}  // namespace
+
+Json CompletionInSource(std::string_view text, size_t offset) {
+  const size_t begin = WordAt(text, offset).begin;
+  const char ahead = begin == 0 ? '\n' : text[begin - 1];
+  Json items = Json::array();
+  if (ahead == '@') {
+    for (const Directive& directive : Directive::All()) AddWord(items, directive.word, kKeyword);
+  } else if (ahead == '$') {
+    for (const Keyword& keyword : AllKeywords().fileLevel) AddWord(items, keyword.word, kKeyword);
+    for (const ClassKeyword& keyword : AllKeywords().classLevel) AddWord(items, keyword.word, kKeyword);
+  } else if (IsInQualifiers(text, begin)) {
+    for (const QualifierWord& word : QualifierWords()) AddWord(items, word.word, kProperty);
+    for (const std::string_view word : {"reflect", "register", "nested"}) AddWord(items, word, kProperty);
+  } else {
+    return nullptr;
+  }
+  return items;
+}
+
+Json CompletionInProject(const std::string& path, std::string_view text, size_t offset) {
+  Json items = Json::array();
+  const size_t begin = WordAt(text, offset).begin;
+  const char ahead = begin == 0 ? '\n' : text[begin - 1];
+  if (ahead == '@') {
+    for (const Directive& directive : Directive::All()) AddWord(items, directive.word, kKeyword);
+    return items;
+  }
+  if (HasExtension(path, "qrpj")) {
+    for (const std::string_view word : kProjectWords) AddWord(items, word, kKeyword);
+    for (const std::string_view word : {"$TARGET_TYPE", "$ROOT_TO_PROJDIR"}) AddWord(items, word, kProperty);
+    return items;
+  }
+  if (HasExtension(path, "qrws")) return items;
+  const auto addKeys = [&](const auto& keys) {
+    for (const auto& key : keys) AddWord(items, key.word, kProperty, key.help);
+  };
+  addKeys(kStringKeys);
+  addKeys(kBoolKeys);
+  addKeys(kNumberKeys);
+  addKeys(kListKeys);
+  addKeys(kCommandKeys);
+  addKeys(kEnvironmentKeys);
+  addKeys(kPathVariables);
+  addKeys(kModes);
+  return items;
+}
+
+// --- Colours
+
+std::vector<std::string> TokenTypes() { return {"macro", "keyword", "variable"}; }
+
+Json SemanticTokens(const TextIndex& index, Columns columns) {
+  Json data = Json::array();
+  Position last;
+  const std::string& text = index.Text();
+  const auto add = [&](size_t begin, size_t end, int type) {
+    const Position at = index.PositionOf(begin, columns), behind = index.PositionOf(end, columns);
+    const int64_t column = at.line == last.line ? at.column - last.column : at.column;
+    for (const int64_t value : {at.line - last.line, column, behind.column - at.column, int64_t{type}, int64_t{0}}) {
+      data.push_back(value);
+    }
+    last = at;
+  };
+  LexScanner scanner(std::string_view(text), Dialect::Cpp);
+  for (size_t at = 0; at < text.size();) {
+    scanner.begin = text.data() + at;
+    LexToken token;
+    try {
+      token = NextToken(scanner);
+    } catch (const LexScannerException&) {
+      at = std::max(at + 1, static_cast<size_t>(scanner.begin - text.data()));
+      continue;
+    }
+    if (token.kind == kEndOfText) break;
+    const auto begin = static_cast<size_t>(token.text.begin - text.data());
+    const auto end = static_cast<size_t>(token.text.end - text.data());
+    at = std::max(end, at + 1);
+    if ((token.kind != kAt && token.kind != kDollar) || end >= text.size()) continue;
+    const bool isVariable = token.kind == kDollar && text[end] == '(';
+    const WordPlace word = WordAt(text, end + (isVariable ? 1 : 0));
+    if (word.begin != end + (isVariable ? 1 : 0) || word.end == word.begin) continue;
+    const std::string_view name = std::string_view(text).substr(word.begin, word.end - word.begin);
+    if (isVariable) {
+      add(begin, word.end, 2);
+    } else if (token.kind == kDollar) {
+      add(begin, word.end, 1);
+    } else if (FindDirective(name)) {
+      add(begin, word.end, 0);
+    }
+    at = word.end;
+  }
+  return data;
+}
+
+// --- Folds: what stands in brackets over several lines, and runs of lines of comment
+
+Json FoldingRanges(const TextIndex& index) {
+  Json ranges = Json::array();
+  const std::string& text = index.Text();
+  std::vector<size_t> open;
+  LexScanner scanner(std::string_view(text), Dialect::Cpp);
+  for (size_t at = 0; at < text.size();) {
+    scanner.begin = text.data() + at;
+    LexToken token;
+    try {
+      token = NextToken(scanner);
+    } catch (const LexScannerException&) {
+      at = std::max(at + 1, static_cast<size_t>(scanner.begin - text.data()));
+      continue;
+    }
+    if (token.kind == kEndOfText) break;
+    const auto begin = static_cast<size_t>(token.text.begin - text.data());
+    at = std::max(static_cast<size_t>(token.text.end - text.data()), at + 1);
+    if (token.kind == kOpenBrace) open.push_back(begin);
+    if (token.kind != kCloseBrace || open.empty()) continue;
+    const int64_t first = index.PositionOf(open.back(), Columns::Utf8).line,
+                  line = index.PositionOf(begin, Columns::Utf8).line;
+    open.pop_back();
+    if (line > first + 1) ranges.push_back({{"startLine", first}, {"endLine", line - 1}});
+  }
+  return ranges;
+}
+
+}  // namespace qrex::server

@@ -1,0 +1,152 @@
+"""A scripted client of the language server."""
+
+import json
+import queue
+import shutil
+import subprocess
+import threading
+from pathlib import Path
+from urllib.parse import quote, unquote
+
+TIMEOUT = 120
+
+
+def uri_of(path):
+    return "file://" + quote(str(path))
+
+
+class Client:
+    """Starts the server for a folder, and keeps what it tells. `place(name, text, within=0)` finds positions by the text that
+    stands there, so that tests speak of names."""
+
+    def __init__(self, server, folder, encoding="utf-16", **options):
+        self.folder, self.encoding = Path(folder).resolve(), encoding
+        self.process = subprocess.Popen([server], stdin=subprocess.PIPE, stdout=subprocess.PIPE, cwd=folder)
+        self.arrived, self.answers, self.notes, self.diagnostics, self.texts = queue.Queue(), {}, [], {}, {}
+        self.next_id = 0
+        threading.Thread(target=self._read, daemon=True).start()
+        self.capabilities = self.ask("initialize", {
+            "processId": None, "rootUri": uri_of(self.folder), "initializationOptions": options,
+            "capabilities": {"general": {"positionEncodings": [encoding]}}})["capabilities"]
+        self.tell("initialized", {})
+
+    def __enter__(self):
+        return self
+
+    def __exit__(self, *_):
+        if self.process.poll() is None:
+            self.process.kill()
+        self.process.wait()
+        self.process.stdin.close()
+
+    def _read(self):
+        stream = self.process.stdout
+        while True:
+            length = None
+            while (line := stream.readline()) not in (b"\r\n", b""):
+                if line.lower().startswith(b"content-length:"):
+                    length = int(line.split(b":")[1])
+            if length is None:
+                return self.arrived.put(None)
+            self.arrived.put(json.loads(stream.read(length)))
+
+    def send_bytes(self, data):
+        self.process.stdin.write(data)
+        self.process.stdin.flush()
+
+    def send(self, message):
+        body = json.dumps({"jsonrpc": "2.0", **message}).encode()
+        self.send_bytes(b"Content-Length: %d\r\n\r\n" % len(body) + body)
+
+    def tell(self, method, params):
+        self.send({"method": method, "params": params})
+
+    def take(self, timeout=TIMEOUT):
+        message = self.arrived.get(timeout=timeout)
+        assert message is not None, "the server has ended"
+        if "method" not in message:
+            self.answers[message["id"]] = message
+        elif message["method"] == "textDocument/publishDiagnostics":
+            self.diagnostics[unquote(message["params"]["uri"])[7:]] = message["params"]["diagnostics"]
+        else:
+            self.notes.append(message)
+        return message
+
+    def start(self, method, params):
+        self.next_id += 1
+        self.send({"id": self.next_id, "method": method, "params": params})
+        return self.next_id
+
+    def wait(self, number):
+        while number not in self.answers:
+            self.take()
+        return self.answers.pop(number)
+
+    def ask(self, method, params):
+        answer = self.wait(self.start(method, params))
+        assert "error" not in answer, answer
+        return answer["result"]
+
+    def fail(self, method, params):
+        return self.wait(self.start(method, params))["error"]["message"]
+
+    # --- Documents
+
+    def path(self, name):
+        return self.folder / name
+
+    def open(self, name, text=None):
+        self.texts[name] = self.path(name).read_text() if text is None else text
+        language = "cpp" if name.endswith((".h", ".cpp")) else "qrex"
+        self.tell("textDocument/didOpen", {"textDocument": {
+            "uri": uri_of(self.path(name)), "languageId": language, "version": 1, "text": self.texts[name]}})
+
+    def close(self, name):
+        self.tell("textDocument/didClose", {"textDocument": {"uri": uri_of(self.path(name))}})
+
+    def units(self, text):
+        return len(text.encode("utf-16-le")) // 2 if self.encoding == "utf-16" else len(text.encode())
+
+    def position(self, name, offset):
+        ahead = self.texts[name][:offset]
+        return {"line": ahead.count("\n"), "character": self.units(ahead[ahead.rfind("\n") + 1:])}
+
+    def place(self, name, text, within=0, index=0):
+        at = -1
+        for _ in range(index + 1):
+            at = self.texts[name].index(text, at + 1)
+        return {"textDocument": {"uri": uri_of(self.path(name))}, "position": self.position(name, at + within)}
+
+    def edit(self, name, old, new):
+        """Replaces the first `old`, as an editor tells it."""
+        at = self.texts[name].index(old)
+        change = {"range": {"start": self.position(name, at), "end": self.position(name, at + len(old))}, "text": new}
+        self.texts[name] = self.texts[name][:at] + new + self.texts[name][at + len(old):]
+        self.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(self.path(name)), "version": 2}, "contentChanges": [change]})
+
+    def text_at(self, location):
+        """(name, text) of a location or range in a file of the folder, from the text of the editor or of the disk."""
+        name = str(Path(unquote(location["uri"])[7:]).relative_to(self.folder))
+        text = self.texts.get(name) or self.path(name).read_text()
+        lines = text.split("\n")
+        start, end = location["range"]["start"], location["range"]["end"]
+        columns = lambda line, units: next(n for n in range(len(line) + 1) if self.units(line[:n]) >= units)  # noqa: E731
+        line = lines[start["line"]]
+        last = columns(lines[end["line"]], end["character"]) if end["line"] == start["line"] else len(line)
+        return name, line[columns(line, start["character"]):last], line
+
+    def until(self, name, holds):
+        """Diagnostics of the file, once they are as wanted."""
+        key = str(self.path(name))
+        while not holds(self.diagnostics.get(key, [])):
+            self.take()
+        return self.diagnostics[key]
+
+
+def server_beside(binary):
+    server = Path(binary).parent / "qrex-lsp"
+    return str(server) if server.exists() else None
+
+
+def has_clangd():
+    return shutil.which("clangd-19") is not None

@@ -1,0 +1,230 @@
+#!/usr/bin/env python3
+"""The language server, by a scripted editor, with the real clangd. Places are found by names."""
+
+import os
+import signal
+import subprocess
+import sys
+from pathlib import Path
+
+sys.path.insert(0, str(Path(__file__).parent))
+from lsp_fixture import Client, server_beside, uri_of  # noqa: E402
+from runtime_fixture import ROOT  # noqa: E402
+from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+
+HEADER = """@import "Vesk/vxObject/IObject.h"
+@def twice(x) = ((x) + (x))
+
+namespace geo
+{
+$struct+ Shape
+{
+    $float64 width;
+    $float64 Area(float64 factor) const
+    {
+        float64 result = width * factor;
+        return twice(result);
+    }
+};
+$class+ Circle : model
+{
+    float64 radius;
+}
+{
+    explicit $$(float64 r) { _model_.radius = r; }
+};
+}
+"""
+MAIN = """@import "shape.h"
+// Größe 😀 of things
+int main()
+{
+    geo::Circle circle(2);
+    geo::Shape shape;
+    /* 😀ü */ double size = circle.Getradius() + shape.Area(2);
+    int count = 1;
+    count += twice(count);
+    return count + (size > 3);
+}
+"""
+SHAPE, APP, PROJECT = "tree/app/src/shape.h", "tree/app/src/app.cpp", "tree/app/src/app.qrpj"
+FILES = {
+    "all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true modernCpp = true\n',
+    "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "app" }\n', SHAPE: HEADER, APP: MAIN,
+    PROJECT: '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nqrex subproj { "Vesk/vxObject" }\n'
+             'config { "Debug|x64" }\n{ "src" { "shape.h" "app.cpp" } }\n'}
+
+
+def session(*tools, **options):
+    """Makes a test of a function of a client whose server works on FILES, of which nothing has been translated."""
+    def decorate(test):
+        def run(binary):
+            need(*tools)
+            if not server_beside(binary):
+                raise Skipped("qrex-lsp")
+            with Workspace(binary, FILES) as workspace:
+                os.environ["XDG_CACHE_HOME"] = str(workspace.path("cache"))
+                before = sorted(p for p in workspace.folder.rglob("*") if "cache" not in p.parts)
+                with Client(server_beside(binary), workspace.folder, **({} if tools else {"clangd": ""}), **options) as client:
+                    test(client)
+                    client.ask("shutdown", None)
+                    client.tell("exit", None)
+                    equal(client.process.wait(30), 0)
+                equal(sorted(p for p in workspace.folder.rglob("*") if "cache" not in p.parts), before)
+        run.__name__ = test.__name__
+        return run
+    return decorate
+
+
+def errors(diagnostics):
+    return [d["message"] for d in diagnostics if d["severity"] == 1]
+
+
+@session()
+def own_errors(client):
+    """Errors of our languages at their words, while typing; they go when they are mended, also in what imports the file."""
+    client.open(SHAPE)
+    client.open(APP)
+    client.edit(SHAPE, "$float64 width;", "$float46 width;")
+    found = client.until(SHAPE, errors)
+    equal(len(found), 1)
+    holds(found[0]["message"], "float46")
+    equal(client.text_at({"uri": uri_of(client.path(SHAPE)), "range": found[0]["range"]})[1], "float46")
+    client.until(APP, errors)  # it says which import has the error
+    client.edit(SHAPE, "$float46", "$float64")
+    client.until(SHAPE, lambda d: not d)
+    client.until(APP, lambda d: not errors(d))
+    client.edit(APP, "twice(count)", "twice(count")
+    client.until(APP, errors)
+    client.edit(APP, "twice(count", "twice(count)")
+    client.until(APP, lambda d: not d)
+    client.open(PROJECT)
+    client.edit(PROJECT, '"app.cpp"', '"app.cpp')
+    client.until(PROJECT, errors)
+    client.edit(PROJECT, '"app.cpp', '"app.cpp"')
+    client.until(PROJECT, lambda d: not d)
+
+
+@session()
+def own_language(client):
+    client.open(SHAPE)
+    client.open(APP)
+    at = client.ask("textDocument/definition", client.place(APP, "twice(count)", 2))
+    equal([client.text_at(location)[:2] for location in at], [(SHAPE, "twice")])
+    holds(client.ask("textDocument/hover", client.place(APP, "twice(count)"))["contents"]["value"], "here it gives", "((count) + (count))")
+    at = client.ask("textDocument/definition", client.place(APP, '"shape.h"', 2))
+    equal([location["uri"] for location in at], [uri_of(client.path(SHAPE))])
+    at = client.ask("textDocument/definition", client.place(APP, "Circle"))
+    holds(client.text_at(at[0])[2], "$class+ Circle")
+    names = {s["name"] for s in client.ask("textDocument/documentSymbol", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})}
+    assert {"Shape", "Circle"} <= names, names
+    names = {s["name"] for s in client.ask("workspace/symbol", {"query": "circ"})}
+    assert "Circle" in names and "Shape" not in names, names
+    for typed, expected in (("@im", "import"), ("$cl", "class"), ("$struct X <<", "compare")):
+        client.edit(SHAPE, "namespace geo", typed + "\nnamespace geo")
+        words = {i["label"] for i in client.ask("textDocument/completion", client.place(SHAPE, typed, len(typed)))}
+        assert expected in words, words
+        client.edit(SHAPE, typed + "\n", "")
+    client.open("all.qrex")
+    words = {i["label"] for i in client.ask("textDocument/completion", client.place("all.qrex", "virtualTree", 3))}
+    assert {"virtualTree", "lineDirectives"} <= words
+    tokens = client.ask("textDocument/semanticTokens/full", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})["data"]
+    equal(tokens[:10], [0, 0, 7, 0, 0, 1, 0, 4, 0, 0])  # @import, @def
+    folds = client.ask("textDocument/foldingRange", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})
+    assert {"startLine": 4, "endLine": HEADER.count("\n") - 2} in folds, folds
+    shown = client.ask("workspace/executeCommand", {"command": "qrex.showGenerated", "arguments": [uri_of(client.path(APP))]})
+    holds(shown["text"], '#include "shape.h"', "((count) + (count))")
+    client.edit(APP, "count = 1", "count = 7")
+    while not any(n["method"] == "qrex/generatedChanged" and "count = 7" in n["params"]["text"] for n in client.notes):
+        client.take()
+
+
+def cpp(client):
+    """What clangd knows, at the places of the sources, behind characters of several bytes."""
+    client.open(APP)
+    client.open(SHAPE)
+    at = client.ask("textDocument/definition", client.place(APP, "Getradius"))
+    equal([client.text_at(location)[:2] for location in at], [(SHAPE, "radius")])
+    holds(client.text_at(at[0])[2], "float64 radius;")
+    at = client.ask("textDocument/definition", client.place(APP, "Area"))
+    equal([client.text_at(location)[:2] for location in at], [(SHAPE, "Area")])
+    hover = client.ask("textDocument/hover", client.place(APP, "size ="))
+    holds(hover["contents"]["value"], "double")
+    equal(client.text_at({"uri": uri_of(client.path(APP)), "range": hover["range"]})[1], "size")
+    holds(client.ask("textDocument/hover", client.place(SHAPE, "result;"))["contents"]["value"], "float64", "result")
+    client.edit(APP, "int count", "circle.\n    int count")
+    found = client.ask("textDocument/completion", client.place(APP, "circle.\n", 7))["items"]
+    assert any(i["label"].strip().startswith("Getradius") for i in found), [i["label"] for i in found][:20]
+    client.edit(APP, "circle.\n    int count", "int count")
+    changes = client.ask("textDocument/rename", {**client.place(APP, "count = 1"), "newName": "total"})["changes"]
+    edits = changes[uri_of(client.path(APP))]
+    equal({client.text_at({"uri": uri_of(client.path(APP)), "range": e["range"]})[1] for e in edits}, {"count"})
+    places = [client.text_at(location) for location in client.ask(
+        "textDocument/references", {**client.place(APP, "size ="), "context": {"includeDeclaration": True}})]
+    equal([text for _, text, _ in places], ["size", "size"])
+    changes = client.ask("textDocument/rename", {**client.place(SHAPE, "result ="), "newName": "sum"})["changes"]
+    equal(len(changes[uri_of(client.path(SHAPE))]), 2)
+    holds(client.fail("textDocument/rename", {**client.place(SHAPE, "radius;"), "newName": "r"}), "generated")
+    client.edit(APP, "size > 3", "size > undeclared_name")
+    found = client.until(APP, errors)
+    holds(found[0]["message"], "undeclared_name")
+    equal(client.text_at({"uri": uri_of(client.path(APP)), "range": found[0]["range"]})[1], "undeclared_name")
+    client.edit(APP, "undeclared_name", "3")
+    client.until(APP, lambda d: not errors(d))
+    # An edit of the header is known to its user at once, though nothing is saved.
+    client.edit(SHAPE, "float64 radius;", "float64 radius; int32 corners;")
+    client.edit(APP, "circle.Getradius()", "circle.Getcorners()")
+    holds(client.ask("textDocument/hover", client.place(APP, "Getcorners"))["contents"]["value"], "Getcorners")
+
+
+@session("clangd-19")
+def cpp_in_utf16(client):
+    cpp(client)
+
+
+@session("clangd-19", encoding="utf-8")
+def cpp_in_utf8(client):
+    equal(client.capabilities["positionEncoding"], "utf-8")
+    cpp(client)
+
+
+@session("clangd-19")
+def dying_clangd(client):
+    """It is started again, and knows what is open; who had asked is answered."""
+    client.open(APP)
+    for _ in range(3):
+        holds(client.ask("textDocument/hover", client.place(APP, "size ="))["contents"]["value"], "double")
+        children = subprocess.run(["pgrep", "-P", str(client.process.pid)], capture_output=True, text=True).stdout.split()
+        equal(len(children), 1)
+        waiting = client.start("textDocument/hover", client.place(APP, "size ="))
+        os.kill(int(children[0]), signal.SIGKILL)
+        client.wait(waiting)
+    holds(client.ask("textDocument/hover", client.place(APP, "size ="))["contents"]["value"], "double")
+
+
+@session()
+def rough_client(client):
+    """Whatever comes, in whatever order: an answer or nothing, and it goes on."""
+    client.open(APP)
+    client.send_bytes(b"Content-Length: x\r\n\r\nContent-Length: 3\r\n\r\n{]}Content-Type: y\r\n\r\n" + b"junk" * 3000 + b"\r\n\r\n")
+    for params in (None, [], 5, {"textDocument": 3}, {"textDocument": {"uri": 5}}, {"textDocument": {"uri": "untitled:x"}}):
+        for method in ("hover", "definition", "completion", "rename", "documentSymbol", "semanticTokens/full", "codeAction", "inlayHint"):
+            client.start(f"textDocument/{method}", params)
+        for method in ("didOpen", "didChange", "didClose", "didSave"):
+            client.tell(f"textDocument/{method}", params)
+    for line, column in ((-5, -5), (10**9, 10**9), (2, 10**15), (0.5, "x")):
+        client.start("textDocument/hover", {"textDocument": {"uri": uri_of(client.path(APP))}, "position": {"line": line, "character": column}})
+    holds(client.fail("no/such", {}), "no/such")
+    for text in ("", "\0\xff\n@def(", "$class A : model {", "@import \"", "/*", 'R"(', "@if(", "$" * 5000, "{" * 5000):
+        client.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(client.path(APP))}, "contentChanges": [{"text": text}]})
+        client.texts[APP] = text
+        client.ask("textDocument/documentSymbol", {"textDocument": {"uri": uri_of(client.path(APP))}})
+    client.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(client.path(APP))}, "contentChanges": [{"text": MAIN}]})
+    client.texts[APP] = MAIN
+    at = client.ask("textDocument/definition", client.place(APP, "twice(count)", 2))
+    equal(len(at), 1)
+    lacks(str(client.diagnostics.get(str(client.path(APP)))), "'severity': 1")
+
+
+if __name__ == "__main__":
+    run_tests([own_errors, own_language, cpp_in_utf16, cpp_in_utf8, dying_clangd, rough_client])
