@@ -12,7 +12,7 @@ namespace qrex::server {
 
 namespace {
 
-constexpr int kError = 1, kWarning = 2;  // severities, and types of messages
+constexpr int kError = 1, kWarning = 2, kInformation = 3;  // severities, and types of messages
 
 bool IsProjectPath(const std::string& path) {
   return HasExtension(path, "qrex") || HasExtension(path, "qrws") || HasExtension(path, "qrpj") ||
@@ -38,6 +38,11 @@ std::string FolderOf(const std::string& path) { return path.substr(0, path.rfind
 // The path by which the tool reads it: from the folder that it works in, or absolute.
 std::string ToolPath(const std::string& path, const std::string& folder) {
   return path.starts_with(folder + "/") ? path.substr(folder.size() + 1) : path;
+}
+
+int SeverityOf(const Message& message) {
+  if (message.severity == Severity::Note) return kInformation;
+  return message.severity == Severity::Error ? kError : kWarning;
 }
 
 std::string CacheFolder(const std::string& configuration) {
@@ -67,7 +72,8 @@ void Server::LoadWorld() {
   const std::set<std::string> touched = m_world ? m_world->TakeTouched() : std::set<std::string>();
   m_own.reset();
   m_mapping.reset();
-  m_world = std::make_unique<SourceWorld>(m_texts);
+  m_mirror = CacheFolder(m_configuration);
+  m_world = std::make_unique<SourceWorld>(m_texts, m_mirror);
   m_mapping = std::make_unique<Mapping>(*m_world);
   m_mapping->columns = m_columns;
   m_own = std::make_unique<OwnLanguage>(*m_world, *m_mapping);
@@ -78,17 +84,55 @@ void Server::LoadWorld() {
     if (m_world->IsLoaded()) document.file = m_world->FindFile(document.path);
     if (document.file) m_changed.insert(document.file);
   }
-  if (m_world->IsLoaded() && !m_clangd) StartClangd();
+  if (!m_world->IsLoaded()) return;
+  m_unmirrored.clear();
+  for (const auto& project : m_world->Loaded().projects) {
+    project->CollectFiles();
+    m_unmirrored.insert(m_unmirrored.end(), project->files.begin(), project->files.end());
+  }
+  WriteCommands(false);
+  if (!m_clangd) StartClangd();
 }
 
-// The commands stand in a folder of our own: clangd keeps its index there, and the tree is not written to.
+// The commands of a build, of the texts in the mirror. clangd takes note of those that are new: `isWhole`, when all of
+// the workspace is there for its index.
+void Server::WriteCommands(bool isWhole) {
+  Json commands = Json::parse(CompileCommandsOf(m_world->Loaded(), FolderOf(m_configuration)), nullptr, false);
+  for (Json& command : commands) {
+    for (Json& word : command["arguments"]) word = InMirror(word.get<std::string>());
+    command["file"] = InMirror(TextAt(command, "file"));
+  }
+  const std::string text = commands.dump(1, ' ', false, Json::error_handler_t::replace) + (isWhole ? "\n" : "");
+  const std::string path = m_mirror + "/compile_commands.json";
+  std::string present;
+  if (ReadWholeFile(present, path) && (present == text || present == text + "\n")) return;
+  CreateDirectories(path, false);
+  ReplaceFile(path, text);
+}
+
+// A word of a command that is, or names behind its switch, a place among the translated files.
+std::string Server::InMirror(std::string word) const {
+  const std::string folder = "qrexsource/";
+  const size_t at = word.find(folder);
+  const bool isPath = at == 0 || (at == 2 && word[0] == '-');
+  return isPath ? word.insert(at, m_mirror + "/") : word;
+}
+
+// In idle moments, so that clangd's index comes to know what nobody has opened.
+void Server::MirrorNext() {
+  ProjectFile& file = *m_unmirrored.back();
+  m_unmirrored.pop_back();
+  try {
+    m_world->Mirror(file);
+  } catch (const IException& exception) {
+    Log(kWarning, ExceptionText(exception));
+    m_unmirrored.clear();
+  }
+  if (m_unmirrored.empty()) WriteCommands(true);
+}
+
 void Server::StartClangd() {
   if (m_clangdWords.front().empty()) return;
-  const std::string folder = FolderOf(m_configuration), cache = CacheFolder(m_configuration);
-  std::string present;
-  const std::string commands = CompileCommandsOf(m_world->Loaded(), folder), file = cache + "/compile_commands.json";
-  CreateDirectories(file, false);
-  if (!ReadWholeFile(present, file) || present != commands) ReplaceFile(file, commands);
   std::string program;
   for (const std::string& name : m_clangdWords) {
     if (program.empty() && (name.find('/') != std::string::npos || !platform::FindProgram(name).empty()))
@@ -96,9 +140,9 @@ void Server::StartClangd() {
   }
   if (program.empty()) return Log(kWarning, "clangd is not installed: C++ itself is not known", true);
   m_clangd = std::make_unique<Clangd>(
-      std::vector<std::string>{program, "--compile-commands-dir=" + cache, "--use-dirty-headers", "--log=error",
+      std::vector<std::string>{program, "--compile-commands-dir=" + m_mirror, "--use-dirty-headers", "--log=error",
                                "--header-insertion=never"},
-      folder, [this](int generation, std::optional<std::string> body) {
+      FolderOf(m_configuration), [this](int generation, std::optional<std::string> body) {
         m_mailbox.Put({false, generation, std::move(body)});
       });
 }
@@ -190,10 +234,12 @@ void Server::BringUpToDate() {
   if (hasChanged) {
     if (!headers.empty()) m_checkedImports.clear();
     for (auto& [uri, document] : m_documents) {
-      if (document.file) ShowToClangd(document);
+      if (!document.file) continue;
+      m_world->TranslationOf(*document.file);
+      ShowImports(document);
     }
     for (auto& [uri, document] : m_documents) {
-      if (document.file) ShowImports(document);
+      if (document.file) ShowToClangd(document);
     }
     for (ProjectFile* header : headers) {
       if (m_clangd) m_clangd->TellSaved(m_world->GeneratedPathOf(*header));
@@ -209,21 +255,12 @@ void Server::ShowToClangd(Document& document) {
   if (document.isShown) Tell("qrex/generatedChanged", {{"uri", document.uri}, {"text", generated.Text()}});
 }
 
-// What it imports is read from the disk where it stands there as it would be made now.
+// What is open has the text of the editor; the rest is read from the mirror.
 void Server::ShowImports(Document& document) {
   if (!m_clangd) return;
   for (ProjectFile* import : m_world->ImportsOf(*document.file)) {
-    if (!m_checkedImports.insert(import).second) continue;
-    const std::string path = m_world->GeneratedPathOf(*import);
-    if (m_documents.contains(m_mapping->SourceUri(*import))) continue;
-    const Translated& translated = m_world->TranslationOf(*import);
-    std::string present;
-    const bool isThere = LoadText(present, path, true) && present == translated.generated.Text();
-    if (isThere || translated.generated.Text().empty()) {
-      m_clangd->Hide(path);
-    } else {
-      m_clangd->Show(path, translated.generated.Text(), true);
-    }
+    const bool isNew = m_checkedImports.insert(import).second;
+    if (isNew && !m_documents.contains(m_mapping->SourceUri(*import))) m_world->Mirror(*import);
   }
 }
 
@@ -241,7 +278,7 @@ Json Server::DiagnosticsOf(Document& document) {
     }
     size_t end = message.place.end > message.place.begin ? static_cast<size_t>(message.place.end) : begin + 1;
     Json one = {{"range", RangeJson(document.text, begin, end, m_columns)},
-                {"severity", message.severity == Severity::Error ? kError : kWarning},
+                {"severity", SeverityOf(message)},
                 {"source", "qrex"},
                 {"message", message.text}};
     if (message.code != 0) one["code"] = message.code;

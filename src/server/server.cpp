@@ -70,6 +70,10 @@ int Server::Run() {
   });
   reader.detach();  // it may wait for input for as long as there is somebody to give some
   while (!m_isOver) {
+    if (!m_unmirrored.empty() && m_clangd && m_mailbox.IsEmpty()) {
+      MirrorNext();
+      continue;
+    }
     const Mailbox::Item item = m_mailbox.Take();
     if (!item.isOfEditor) {
       if (m_clangd) m_clangd->Take(item.generation, item.body, [this](const Json& message) { FromClangd(message); });

@@ -81,6 +81,9 @@ class Server {
   void LoadWorldFor(const std::string& path);
   void LoadWorld();
   void StartClangd();
+  void WriteCommands(bool isWhole);
+  std::string InMirror(std::string word) const;
+  void MirrorNext();
   void TextChanged(Document& document);
   void BringUpToDate();  // translates what has changed, and tells both sides
   void ShowToClangd(Document& document);
@@ -134,6 +137,8 @@ class Server {
   std::string m_configuration;  // absolute; empty: none was found yet
   std::vector<std::string> m_lines, m_clangdWords;
   std::string m_rootFolder;
+  std::string m_mirror;                           // of this configuration
+  std::vector<ProjectFile*> m_unmirrored;         // of the workspace
   std::map<std::string, Document> m_documents;    // by address
   std::set<ProjectFile*> m_changed;               // since the last translation
   std::set<const ProjectFile*> m_checkedImports;  // whose texts clangd sees as they are

@@ -69,11 +69,7 @@ bool SourceWorld::Load(const std::string& configuration, const std::vector<std::
   if (!m_workspace) return false;
   for (const auto& [path, file] : m_workspace->fileMap) {
     m_bySource.emplace(SourceFullPathOf(*file), file);
-    if (const ProjectConfig* config = file->project->FindConfig(m_settings->config, m_settings->platform)) {
-      if (IsTranslated(*file->project) && IsTranslated(*file)) {
-        m_byGenerated.emplace(FullPath(PathJoin(TranslationDirectory(*config), file->path)), file);
-      }
-    }
+    m_byGenerated.emplace(GeneratedPathOf(*file), file);
   }
   return true;
 }
@@ -85,7 +81,7 @@ std::string SourceWorld::SourceFullPathOf(const ProjectFile& file) { return Full
 std::string SourceWorld::GeneratedPathOf(const ProjectFile& file) const {
   const ProjectConfig* const config = file.project->FindConfig(m_settings->config, m_settings->platform);
   if (!config || !IsTranslated(*file.project) || !IsTranslated(file)) return FullPath(SourcePathOf(file));
-  return FullPath(PathJoin(TranslationDirectory(*config), file.path));
+  return m_mirror + "/" + PathJoin(TranslationDirectory(*config), file.path);
 }
 
 ProjectFile* SourceWorld::FindFile(const std::string& path) const {
@@ -101,7 +97,6 @@ ProjectFile* SourceWorld::FindGenerated(const std::string& path) const {
 // --- Messages
 
 void SourceWorld::Take(const Message& message) {
-  if (message.severity == Severity::Note) return;  // it belongs to one that is told as well
   m_messages[message.place.file].push_back(message);
   m_touched.insert(message.place.file);
 }
@@ -193,6 +188,16 @@ void SourceWorld::Translate(ProjectFile& file, Translated& translated) {
     translated.isFaulty = true;
     Take(ErrorOf(exception));
   }
+}
+
+void SourceWorld::Mirror(ProjectFile& file) {
+  const std::string path = GeneratedPathOf(file);
+  const std::string& text = TranslationOf(file).generated.Text();
+  if (!path.starts_with(m_mirror + "/")) return;
+  std::string present;
+  if (ReadWholeFile(present, path) && present == text) return;
+  CreateDirectories(path, false);
+  ReplaceFile(path, text);
 }
 
 std::vector<ProjectFile*> SourceWorld::ImportsOf(ProjectFile& file) {

@@ -1,5 +1,6 @@
 // A workspace as the server sees it: loaded once, its files translated in memory from the texts of the editor or the
-// disk. The process stays in the folder of the configuration, where a run would be. Nothing is written.
+// disk. The process stays in the folder of the configuration, where a run would be. The tree and the outputs of builds
+// are left alone.
 #pragma once
 
 #include <map>
@@ -27,8 +28,9 @@ struct Translated {
 
 class SourceWorld : private MessageConsumer {
  public:
-  // Texts in memory are laid over those of the disk by their paths as the tool has them.
-  explicit SourceWorld(OverlaidTexts& texts) : m_texts(texts) {}
+  // Texts in memory are laid over those of the disk by their paths as the tool has them. `mirror`: the folder in which
+  // clangd finds generated texts, under the paths that a build gives them.
+  SourceWorld(OverlaidTexts& texts, std::string mirror) : m_texts(texts), m_mirror(std::move(mirror)) {}
   ~SourceWorld() override;
 
   // Loads the configuration, whose path has a folder that the process has gone to, with further lines of settings.
@@ -42,11 +44,12 @@ class SourceWorld : private MessageConsumer {
   ProjectFile* FindGenerated(const std::string& path) const;  // by that of its translation
   static std::string SourcePathOf(const ProjectFile& file);   // as messages name it
   static std::string SourceFullPathOf(const ProjectFile& file);
-  std::string GeneratedPathOf(const ProjectFile& file) const;  // absolute; of a file that is not translated, its source
+  std::string GeneratedPathOf(const ProjectFile& file) const;  // in the mirror; of what is not translated, its source
 
   // Takes back what the file has declared, and all that imports it: they are translated anew when they are asked for.
   void Changed(ProjectFile& file);
   const Translated& TranslationOf(ProjectFile& file);
+  void Mirror(ProjectFile& file);             // writes the generated text there, if it differs
   ScannedFile* ScannedOf(ProjectFile& file);  // in its own project, translated if that is possible; or null
   std::vector<ProjectFile*> ImportsOf(ProjectFile& file);  // of all it sees, as far as is known
 
@@ -55,15 +58,13 @@ class SourceWorld : private MessageConsumer {
   std::set<std::string> TakeTouched();  // paths whose messages have changed since it was asked last
 
  private:
-  struct OwnProject {
-    std::unique_ptr<KeepingFiles> files;
-  };
   void Take(const Message& message) override;
   KeepingFiles* FilesOf(Project& project);
   void Translate(ProjectFile& file, Translated& translated);
   void ForgetMessages(const std::string& path);
 
   OverlaidTexts& m_texts;
+  const std::string m_mirror;
   std::unique_ptr<ConfigSettings> m_settings;
   std::shared_ptr<Workspace> m_workspace;
   std::unordered_map<const Project*, std::unique_ptr<KeepingFiles>> m_projects;  // null: lacks the configuration
