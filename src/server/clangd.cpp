@@ -52,12 +52,13 @@ void Clangd::Start() {
   m_isReady = false;
   const Json params = {{"processId", nullptr}, {"rootUri", UriOfPath(m_folder)}, {"capabilities", Capabilities()}};
   const int64_t id = m_nextId++;
-  m_asked[id] = [this](const Json&) {
+  const auto begin = [this](const Json&) {
     m_isReady = true;
     Send({{"jsonrpc", "2.0"}, {"method", "initialized"}, {"params", Json::object()}});
     for (auto& [path, shown] : m_shown) Open(path, shown);
     for (const Json& message : std::exchange(m_waiting, {})) Send(message);
   };
+  m_asked[id] = {begin, {}, true};
   m_peer->Write(Framed({{"jsonrpc", "2.0"}, {"id", id}, {"method", "initialize"}, {"params", params}}));
 }
 
@@ -71,12 +72,19 @@ void Clangd::Restart() {
   Stop();
   m_idleDeaths = m_hasAnswered ? 1 : m_idleDeaths + 1;
   m_waiting.clear();
-  for (const auto& [id, answer] : std::exchange(m_asked, {})) answer(nullptr);
-  if (m_idleDeaths > kMostIdleDeaths) {
-    m_hasGivenUp = true;
-  } else {
-    Start();
+  m_hasGivenUp = m_idleDeaths > kMostIdleDeaths;
+  std::vector<Asked> lost;
+  std::erase_if(m_asked, [&](auto& asked) {
+    const bool isLost = asked.second.isRepeated || m_hasGivenUp;
+    if (isLost && !asked.second.message.is_null()) lost.push_back(std::move(asked.second));
+    return isLost;
+  });
+  for (auto& [id, asked] : m_asked) {
+    asked.isRepeated = true;
+    m_waiting.push_back(asked.message);
   }
+  if (!m_hasGivenUp) Start();
+  for (const Asked& asked : lost) asked.answer(nullptr);
 }
 
 // What is asked ahead of the answer to `initialize` waits for it. Texts are opened then as they are.
@@ -95,8 +103,9 @@ int64_t Clangd::Ask(const std::string& method, Json params, Answer answer) {
     answer(nullptr);
     return id;
   }
-  m_asked[id] = std::move(answer);
-  Send({{"jsonrpc", "2.0"}, {"id", id}, {"method", method}, {"params", std::move(params)}});
+  const Json message = {{"jsonrpc", "2.0"}, {"id", id}, {"method", method}, {"params", std::move(params)}};
+  m_asked[id] = {std::move(answer), message, false};
+  Send(message);
   return id;
 }
 
@@ -117,7 +126,7 @@ void Clangd::Take(int generation, const std::optional<std::string>& body,
   if (message.contains("method")) return other(message);
   const auto asked = m_asked.find(NumberAt(message, "id", -1));
   if (asked == m_asked.end()) return;
-  const Answer answer = std::move(asked->second);
+  const Answer answer = std::move(asked->second.answer);
   m_asked.erase(asked);
   m_hasAnswered |= m_isReady;
   answer(At(message, "result"));

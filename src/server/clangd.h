@@ -1,4 +1,5 @@
-// clangd as a child: it knows the generated texts alone, and speaks in bytes. One that dies is started again.
+// clangd as a child: it knows the generated texts alone, and speaks in bytes. One that dies is started again, and asked
+// again what it has not answered.
 #pragma once
 
 #include <functional>
@@ -62,7 +63,12 @@ class Clangd {
   bool m_hasAnswered = false;   // this one, anything else
   int m_idleDeaths = 0;         // in a row, of those that had not
   int64_t m_nextId = 0;
-  std::map<int64_t, Answer> m_asked;
+  struct Asked {
+    Answer answer;
+    Json message;
+    bool isRepeated = false;  // to a second child: it is not asked a third time
+  };
+  std::map<int64_t, Asked> m_asked;
   std::map<std::string, Shown> m_shown;
 };
 

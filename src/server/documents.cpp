@@ -69,7 +69,6 @@ void Server::LoadWorld() {
   for (auto& [uri, document] : m_documents) document.file = nullptr;
   m_changed.clear();
   m_checkedImports.clear();
-  const std::set<std::string> touched = m_world ? m_world->TakeTouched() : std::set<std::string>();
   m_own.reset();
   m_mapping.reset();
   m_mirror = CacheFolder(m_configuration);
@@ -222,7 +221,10 @@ void Server::Saved(const std::string& path) {
 // --- Translation
 
 void Server::BringUpToDate() {
-  if (m_mustReload && m_world) LoadWorld();
+  if (m_mustReload && m_world) {
+    LoadWorld();
+    for (auto& [uri, document] : m_documents) Publish(document);
+  }
   if (!m_world || !m_world->IsLoaded()) return PublishTouched();
   std::set<ProjectFile*> headers;
   for (ProjectFile* file : m_changed) {
@@ -238,8 +240,10 @@ void Server::BringUpToDate() {
       m_world->TranslationOf(*document.file);
       ShowImports(document);
     }
-    for (auto& [uri, document] : m_documents) {
-      if (document.file) ShowToClangd(document);
+    for (const bool isHeader : {true, false}) {  // who includes a text is to find it as it is now
+      for (auto& [uri, document] : m_documents) {
+        if (document.file && (document.file->kind == FileKind::H) == isHeader) ShowToClangd(document);
+      }
     }
     for (ProjectFile* header : headers) {
       if (m_clangd) m_clangd->TellSaved(m_world->GeneratedPathOf(*header));

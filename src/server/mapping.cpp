@@ -127,7 +127,9 @@ bool Mapping::Edits(const Json& answer, Json& mapped) {
     for (const Json& edit : edits) {
       const auto one = file ? Edit(*file, edit) : std::optional<Json>(edit);
       if (!one) return false;
-      changes[file ? SourceUri(*file) : uri].push_back(*one);
+      Json& its = changes[file ? SourceUri(*file) : uri];
+      const bool isKnown = std::find(its.begin(), its.end(), *one) != its.end();  // the argument of a macro, used twice
+      if (!isKnown) its.push_back(*one);
     }
   }
   mapped = {{"changes", std::move(changes)}};
