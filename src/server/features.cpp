@@ -66,7 +66,11 @@ void Server::Completion(const Json& params, Reply reply) {
   if (IsProjectText(*place->document)) {
     return reply(CompletionInProject(place->document->path, place->document->text.Text(), place->offset));
   }
-  Json own = CompletionInSource(place->document->text.Text(), place->offset);
+  const TextIndex& text = place->document->text;
+  Json own = CompletionInSource(text.Text(), place->offset);
+  // Editors differ on whether `@` and `$` are parts of words: what is replaced is said.
+  const Json range = RangeJson(text, WordAt(text.Text(), place->offset).begin, place->offset, m_columns);
+  for (Json& item : own) item["textEdit"] = {{"range", range}, {"newText", item["label"]}};
   if (!own.is_null() || !place->file) return reply(std::move(own));
   AskAt("textDocument/completion", params, *place, [this, file = place->file, reply](const Json& answer) {
     Json list = {{"isIncomplete", At(answer, "isIncomplete") == true}, {"items", Json::array()}};

@@ -5,6 +5,7 @@ import os
 import signal
 import subprocess
 import sys
+from random import Random
 from pathlib import Path
 
 sys.path.insert(0, str(Path(__file__).parent))
@@ -227,5 +228,53 @@ def rough_client(client):
     lacks(str(client.diagnostics.get(str(client.path(APP)))), "'severity': 1")
 
 
+PIECES = ["\n", " ", "{", "}", ";", "$", "@", '"', "*/", "/*", "$struct+ S { $int32 n; };\n", "$enum+ E { one, two };\n", "@def m(x) = x + 1\n",
+          "int i = m(2);\n", '@import "shape.h"\n', "// ü😀\n", "geo::Shape other;\n", "$float64 depth;\n", "twice(1)", "$$", "@if (1)\n{\n}\n"]
+
+
+def state(client):
+    """What the server makes of the open texts."""
+    made = {}
+    for name in (SHAPE, APP):
+        shown = client.ask("workspace/executeCommand", {"command": "qrex.showGenerated", "arguments": [uri_of(client.path(name))]})
+        client.ask("workspace/executeCommand", {"command": "qrex.hideGenerated", "arguments": [uri_of(client.path(name))]})
+        told = [d["message"] for d in client.diagnostics.get(str(client.path(name)), []) if d["source"] == "qrex"]
+        made[name] = (told, None if told else shown["text"])  # with errors, the last good one
+    return made
+
+
+@session()
+def random_edits(client):
+    """Whatever the way to them, texts give what they give to a fresh server; and the server does not grow."""
+    random = Random(4711)
+    client.open(SHAPE)
+    client.open(APP)
+    sizes, compared = [], 0
+    for turn in range(1, 3001):
+        name = random.choice((SHAPE, APP))
+        text = client.texts[name]
+        if turn % 3 == 0 or len(text) > 3000:
+            text = {SHAPE: HEADER, APP: MAIN}[name]
+        at = random.randrange(len(text) + 1)
+        cut = random.choice((0, 0, 0, 1, 5, 40))
+        client.texts[name] = text[:at] + random.choice(PIECES) + text[at + cut:]
+        client.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(client.path(name)), "version": turn},
+                                               "contentChanges": [{"text": client.texts[name]}]})
+        if turn % 20 == 0:
+            made = state(client)
+            with Client(client.process.args[0], client.folder, clangd="") as fresh:
+                for other in (SHAPE, APP):
+                    fresh.open(other, client.texts[other])
+                expected = state(fresh)
+            for other in (SHAPE, APP):
+                equal(made[other], expected[other])
+                compared += made[other][1] is not None
+        if turn in (1000, 3000):
+            status = Path(f"/proc/{client.process.pid}/status").read_text()
+            sizes.append(int(status[status.index("VmRSS:") + 6:].split()[0]))
+    assert compared > 10, compared
+    assert sizes[1] < sizes[0] + 10_000, sizes
+
+
 if __name__ == "__main__":
-    run_tests([own_errors, own_language, cpp_in_utf16, cpp_in_utf8, dying_clangd, rough_client])
+    run_tests([own_errors, own_language, cpp_in_utf16, cpp_in_utf8, dying_clangd, rough_client, random_edits])
