@@ -3,7 +3,11 @@
 
 const COMMENT = /^(?:\s|@?\/\/[^\n]*|@?\/\*[\s\S]*?\*\/)+/;
 // Macros may stand ahead of statements; C++ has them, too, but no statement of ours behind them.
-const MACROS = /^(?:@\s*(?:import|importpath)\s*"[^"\n]*"|@\s*(?:def|let|assert|println?)\b[^\n{]*(?:\{[^}]*\})?[^\n]*)/;
+const MACROS = new RegExp(
+  ['@\\s*(?:import|importpath)\\s*"[^"\\n]*"', '@\\s*def\\b[^\\n{]*=\\s*\\{[^}]*\\}', '@\\s*(?:def|let|assert|println?)\\b[^\\n]*']
+    .map((one) => `^${one}`)
+    .join('|'),
+);
 const STATEMENT = new RegExp(
   [
     '[+-](?:cpp|rc|link)\\b\\s*[({]',
@@ -11,7 +15,7 @@ const STATEMENT = new RegExp(
     '(?:config|subproj|toolfiles)\\s*\\{',
     'directories\\s*[-+["]',
     '(?:general|prebuildevent|prelinkevent|postbuildevent)\\s*[({]',
-    '[A-Za-z]\\w*\\s*\\+?=\\s*(?:[{"]\\s*["}]?|true\\b|false\\b|\\w+\\s*$)',
+    '[A-Za-z]\\w*\\s*\\+?=\\s*(?:[{"]|true\\b|false\\b|\\w+\\s*$)',
     '(?:PATH|INCLUDE|LIB)\\s*\\(\\s*"',
   ].join('|'),
   'my',

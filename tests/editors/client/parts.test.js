@@ -30,7 +30,7 @@ test('a program without a folder is looked for in PATH', () => {
 test('settings are told by their first statement', () => {
   const files = ['templates/workspace/settings.inc', 'templates/workspace/tree/common.inc', 'examples/first/tree/common.inc'];
   for (const file of files) assert.ok(looksLikeSettings(fs.readFileSync(path.join(REPOSITORY, file), 'utf8')), file);
-  const ours = ['/* a */ @import "b.inc"\n$X = "1"', '@def f = { -g }\n+cpp { f }', 'mode = build', 'PATH("x") = { "/bin" }', 'subproj { "a" }'];
+  const ours = ['/* a */ @import "b.inc"\n$X = "1"', '@def f =\n{\n-g\n}\n+cpp { f }', 'mode = build', 'PATH("x") = { "/bin" }', 'subproj { "a" }'];
   const others = ['', '{ 1, 2 },', 'int n = 3;', '#include "a.h"', '@def f(x) = x\nint n = f(3);', '<?php $a = "x";', 'X(a, b)', 'config(a);'];
   assert.deepStrictEqual([...ours, ...others].filter(looksLikeSettings), ours);
 });

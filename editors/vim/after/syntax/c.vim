@@ -1,0 +1,52 @@
+" What Qrex adds to C and C++.
+
+if exists('b:qrex_in_c')
+  finish
+endif
+runtime! syntax/qrexmacros.vim
+syn match qrexSubstitution '\$(\h\w*)' contained containedin=cString
+
+" `$TYPE NAME` of fields and methods; the words below it are more than types.
+syn match qrexMember '\$\%(\%(const\|static\|inline\|virtual\)\s\+\)*\h\w*\%(::\h\w*\)*'
+syn match qrexWord '\$\%(this\|new\|init\|uninit\|evict\|visit\|dropped\|evolve\|makefunctor\|makeconstfunctor\|warning\)\>'
+syn match qrexWord '\$\$'
+syn match qrexDeclare '\$\%(type\|typedef\|var\|function\|polymorphic\|functor\|cache\)\>' nextgroup=qrexMark,qrexQualifiers skipwhite
+syn match qrexDeclare '\$enum\>' nextgroup=qrexMark,qrexTypeName,qrexKind skipwhite
+syn match qrexMark '[-+^]\+' contained nextgroup=qrexQualifiers,qrexTypeName,qrexKind skipwhite
+syn match qrexTypeName '\h\w*\%(::\h\w*\)*' contained
+syn match qrexKind '\<\%(class\|implement\|ipc\|rmi\)\>' contained nextgroup=qrexTypeName skipwhite
+
+" The name behind a word of a type is its own; what follows up to the body are others.
+syn region qrexHeading matchgroup=qrexDeclare start='\$\%(struct\|class\|mixin\|model\|adt\|variant\|interface\|implementing\)\>'
+      \ end='[;{}]'me=s-1 contains=qrexDeclared,qrexHeadingMark,qrexKind,qrexHeadingWord,qrexQualifiers,cString,cNumber,cComment,cCommentL,qrexComment
+syn match qrexDeclared '\%(\$\h\w*\s*+\=\s*\%(\%(implement\|ipc\|rmi\)\s\+\)\=\)\@60<=\<\%(\%(implement\|ipc\|rmi\)\>\)\@!\h\w*\%(::\h\w*\)*' contained
+syn match qrexHeadingMark '+' contained
+syn keyword qrexHeadingWord isa model mixin public protected private virtual final contained
+syn match qrexHeadingWord '^\s*\zsmixin\ze\s*\['
+syn region qrexQualifiers start='<<' end='>>' end='$' contained oneline contains=qrexQualifier
+syn keyword qrexQualifier contained reflect register abstract dc copy compare print ser os ar passbyvalue
+      \ returnbyvalue rod traits nested extern genop multiline async io queue visit
+
+" Sections of code between the name of a calculated field and its semicolon.
+syn region qrexCalculated matchgroup=qrexDeclare start='\$\%(dep\|indep\)\>\s*[-^]*' end=';' end='}'me=s-1 transparent contains=TOP,qrexSection,qrexQualifiers
+syn match qrexSection '\<\%(calc\|create\|destroy\|evict\|evictable\|invalidate\|visit\)\ze\%(\s*{\|\s*$\)' contained
+
+syn region qrexSchema matchgroup=qrexDeclare start='\$schema\>' end='}' contains=qrexRelease,qrexChange,cComment,cCommentL,qrexComment
+syn match qrexRelease '\<\d\+\ze\s*:' contained
+syn match qrexChange '[-+]' contained
+
+hi def link qrexChange Operator
+hi def link qrexDeclare Structure
+hi def link qrexDeclared Typedef
+hi def link qrexHeadingMark Operator
+hi def link qrexHeadingWord Statement
+hi def link qrexKind StorageClass
+hi def link qrexMark Operator
+hi def link qrexMember Type
+hi def link qrexQualifier StorageClass
+hi def link qrexRelease Number
+hi def link qrexSection Label
+hi def link qrexTypeName Typedef
+hi def link qrexWord Keyword
+
+let b:qrex_in_c = 1
