@@ -45,11 +45,11 @@ local function configuration_of(root)
     root_dir = root,
     workspace_folders = { { uri = vim.uri_from_fname(root), name = vim.fn.fnamemodify(root, ':t') } },
     capabilities = settings.capabilities,
-    init_options = {
+    init_options = vim.tbl_extend('force', vim.empty_dict(), {
       configuration = settings.configuration,
       arguments = settings.arguments,
       clangd = settings.clangd,
-    },
+    }),
     handlers = { ['qrex/generatedChanged'] = follow },
     on_attach = on_attach,
     get_language_id = function(_, filetype) return filetype end,

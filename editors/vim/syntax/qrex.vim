@@ -5,7 +5,7 @@ if exists('b:current_syntax')
 endif
 runtime! syntax/qrexmacros.vim
 
-syn keyword qrexKey mode compiler runtime config platform systemName systemProcessor systemVersion sizeofPointer
+syn keyword qrexKey mode compiler runtime platform systemName systemProcessor systemVersion sizeofPointer
       \ platformToolset sourceFolder depfile windowsSdk buildTrace schemaLock report targetXP defaultToDll diagnostics
       \ translateOnly rebuildAll exportPublicHeaders repackageExecutableTargets solutionContainsPrepackagedProjects
       \ makeTranslatedFilesReadOnly makeExportedHeaderFilesReadOnly writeTokenEquivalent modernCpp compilableText
@@ -13,9 +13,10 @@ syn keyword qrexKey mode compiler runtime config platform systemName systemProce
       \ jobs virtualTree workspaces launcher PATH INCLUDE LIB OutputDirectory IntermediateDirectory
       \ DeleteExtensionsOnClean BuildLogFile InheritedPropertySheets ConfigurationType UseOfMFC UseOfATL
       \ ATLMinimizesCRunTimeLibraryUsage CharacterSet ManagedExtensions WholeProgramOptimization PlatformToolset
-syn keyword qrexStatement config subproj toolfiles directories prebuildevent prelinkevent postbuildevent general qrex export
+syn keyword qrexStatement subproj toolfiles directories prebuildevent prelinkevent postbuildevent general qrex export
 syn keyword qrexStatement as flat exclude
-" A key and a statement of projects share this word.
+" A statement of projects and a key share this word.
+syn match qrexStatement '\<config\>'
 syn match qrexKey '\<config\ze\s*='
 syn keyword qrexBoolean true false
 syn match qrexWord '=\s*\zs\<\%(clean\|compile\|build\|gen\|show\|vc\d\+\|gcc\|winegcc\|clang\|none\|source\|built\)\>'
@@ -30,10 +31,11 @@ syn region qrexLineComment start='//' end='$' contains=@Spell
 syn region qrexLineComment start='/\*' end='\*/' contains=@Spell
 
 " What stands in the braces is the compiler's. A scope in parentheses may be ahead of them.
-syn match qrexStatement '[+-]\%(cpp\|rc\|link\)\>' nextgroup=qrexScope,qrexSwitches skipwhite skipempty
-syn region qrexScope start='(' end=')' contained contains=qrexString nextgroup=qrexSwitches skipwhite skipempty
-syn region qrexSwitches matchgroup=qrexBrace start='{' end='}' contained contains=TOP,qrexSwitch,qrexSubstitution,qrexKey,qrexStatement
-syn match qrexSwitch '\%(^\|[[:space:]{]\)\@1<=[-/]\a[^[:space:]"'{}]*' contained
+syn match qrexStatement '[+-]\%(cpp\|rc\|link\)\>' nextgroup=qrexScope,qrexSwitches skipwhite skipnl skipempty
+syn region qrexScope start='(' end=')' contained contains=qrexString nextgroup=qrexSwitches skipwhite skipnl skipempty
+syn cluster qrexText contains=qrexDirective,qrexConditional,qrexRepeat,qrexInclude,qrexDefine,qrexOperator,qrexPredefined,qrexSubstitution,qrexComment,qrexLineComment,qrexString
+syn region qrexSwitches matchgroup=qrexBrace start='{' end='}' contained contains=@qrexText,qrexSwitch
+syn match qrexSwitch '\%([^[:space:]{]\)\@1<![-/]\a[^[:space:]"'{}]*' contained
 
 hi def link qrexBadEscape Error
 hi def link qrexBoolean Boolean
@@ -47,5 +49,8 @@ hi def link qrexStatement Statement
 hi def link qrexString String
 hi def link qrexSwitch Special
 hi def link qrexWord Constant
+
+" Files are short.
+syn sync fromstart
 
 let b:current_syntax = 'qrex'

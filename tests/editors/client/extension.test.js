@@ -10,7 +10,7 @@ const { after, before, test } = require('node:test');
 const { makeEditor } = require('./editor');
 
 const ROOT = path.join(__dirname, '../../../editors/vscode');
-const SERVER = path.join(__dirname, 'server.js');
+const SERVER = path.join(__dirname, '../server.py');
 const manifest = require(path.join(ROOT, 'package.json'));
 
 let folder, editor, extension;
@@ -62,7 +62,7 @@ test('documents of our languages are opened and their errors shown', async () =>
   assert.strictEqual((await told(source)).message, 'wrong cpp');
   assert.strictEqual((await told(settings)).message, 'wrong qrex');
   const { documents } = await state();
-  assert.deepStrictEqual(documents.map(([uri]) => path.basename(uri)), ['a.cpp', 'a.qrpj']);
+  assert.deepStrictEqual(documents.map((uri) => path.basename(uri)), ['a.cpp', 'a.qrpj']);
 });
 
 test('settings in a file .inc are told from other texts', async () => {
@@ -107,7 +107,7 @@ test('tasks run the tool beside the server, in the folder of the configuration',
   assert.strictEqual(tasks[0].group, 'build');
   const definition = { type: 'qrex', configuration: 'sub/all.qrex', arguments: ['jobs=1'] };
   const { execution, matchers, definition: kept } = provider.resolveTask({ definition, scope: editor.module.workspace.workspaceFolders[0] });
-  assert.strictEqual(execution.process, path.join(__dirname, 'Qrex'));
+  assert.strictEqual(execution.process, path.join(__dirname, '../Qrex'));
   assert.deepStrictEqual(execution.args, ['all.qrex', 'config="Release"', 'jobs=1']);
   assert.strictEqual(execution.options.cwd, path.join(folder, 'sub'));
   assert.strictEqual(kept, definition);  // the editor takes no other one

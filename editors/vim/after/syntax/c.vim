@@ -1,10 +1,7 @@
-" What Qrex adds to C and C++.
+" What Qrex adds to C and C++, whose syntax reads that of C.
 
-if exists('b:qrex_in_c')
-  finish
-endif
 runtime! syntax/qrexmacros.vim
-syn match qrexSubstitution '\$(\h\w*)' contained containedin=cString
+syn match qrexSubstitution '\$(\h\w*)' contained containedin=cString,cppString
 
 " `$TYPE NAME` of fields and methods; the words below it are more than types.
 syn match qrexMember '\$\%(\%(const\|static\|inline\|virtual\)\s\+\)*\h\w*\%(::\h\w*\)*'
@@ -18,17 +15,26 @@ syn match qrexKind '\<\%(class\|implement\|ipc\|rmi\)\>' contained nextgroup=qre
 
 " The name behind a word of a type is its own; what follows up to the body are others.
 syn region qrexHeading matchgroup=qrexDeclare start='\$\%(struct\|class\|mixin\|model\|adt\|variant\|interface\|implementing\)\>'
-      \ end='[;{}]'me=s-1 contains=qrexDeclared,qrexHeadingMark,qrexKind,qrexHeadingWord,qrexQualifiers,cString,cNumber,cComment,cCommentL,qrexComment
+      \ end='[;{}]'me=s-1 contains=qrexDeclared,qrexHeadingMark,qrexKind,qrexHeadingWord,qrexQualifiers,cString,cppString,cNumbers,cppNumbers,cComment,cCommentL,qrexComment
 syn match qrexDeclared '\%(\$\h\w*\s*+\=\s*\%(\%(implement\|ipc\|rmi\)\s\+\)\=\)\@60<=\<\%(\%(implement\|ipc\|rmi\)\>\)\@!\h\w*\%(::\h\w*\)*' contained
 syn match qrexHeadingMark '+' contained
-syn keyword qrexHeadingWord isa model mixin public protected private virtual final contained
-syn match qrexHeadingWord '^\s*\zsmixin\ze\s*\['
+syn keyword qrexHeadingWord contained isa model mixin public protected private virtual final
+syn match qrexMixins '^\s*\zsmixin\ze\s*\['
 syn region qrexQualifiers start='<<' end='>>' end='$' contained oneline contains=qrexQualifier
 syn keyword qrexQualifier contained reflect register abstract dc copy compare print ser os ar passbyvalue
       \ returnbyvalue rod traits nested extern genop multiline async io queue visit
 
+" In parentheses the syntax of C takes whatever it does not know to be part of something else.
+syn cluster qrexInner contains=qrexExported,qrexMacroName,qrexMacroType,qrexParameters,qrexParameter,qrexParameterType,qrexVariable
+syn cluster qrexInner add=qrexVariableType,qrexLoop,qrexIn,qrexSubstitution,qrexMark,qrexTypeName,qrexKind,qrexDeclared,qrexHeadingMark
+syn cluster qrexInner add=qrexQualifier,qrexRelease,qrexChange,qrexHeadingWord
+syn cluster cParenGroup add=@qrexInner,qrexSection,qrexQualifiers
+syn cluster cPreProcGroup add=@qrexInner,qrexSection,qrexQualifiers
+syn cluster cMultiGroup add=@qrexInner,qrexSection,qrexQualifiers
+
 " Sections of code between the name of a calculated field and its semicolon.
-syn region qrexCalculated matchgroup=qrexDeclare start='\$\%(dep\|indep\)\>\s*[-^]*' end=';' end='}'me=s-1 transparent contains=TOP,qrexSection,qrexQualifiers
+syn region qrexCalculated matchgroup=qrexDeclare start='\$\%(dep\|indep\)\>\s*[-^]*' end=';' end='}'me=s-1 transparent
+      \ contains=ALLBUT,@qrexInner,cErrInParen,cErrInBracket,cParenError,cIncluded,cSpecial,cCommentSkip,cCommentString,cComment2String,@cCommentGroup,cCommentStartError,cUserLabel,cBitField,cOctalZero,@cCppOutInGroup,cFormat,cNumber,cFloat,cOctal,cOctalError,cNumbersCom
 syn match qrexSection '\<\%(calc\|create\|destroy\|evict\|evictable\|invalidate\|visit\)\ze\%(\s*{\|\s*$\)' contained
 
 syn region qrexSchema matchgroup=qrexDeclare start='\$schema\>' end='}' contains=qrexRelease,qrexChange,cComment,cCommentL,qrexComment
@@ -43,10 +49,9 @@ hi def link qrexHeadingWord Statement
 hi def link qrexKind StorageClass
 hi def link qrexMark Operator
 hi def link qrexMember Type
+hi def link qrexMixins Statement
 hi def link qrexQualifier StorageClass
 hi def link qrexRelease Number
 hi def link qrexSection Label
 hi def link qrexTypeName Typedef
 hi def link qrexWord Keyword
-
-let b:qrex_in_c = 1
