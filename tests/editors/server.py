@@ -22,8 +22,14 @@ def generated(uri):
 
 def initialize(params):
     started.update(options=params.get("initializationOptions"), arguments=sys.argv[1:], folder=os.getcwd())
-    return {"capabilities": {"textDocumentSync": 1, "executeCommandProvider": {
-        "commands": ["qrex.showGenerated", "qrex.hideGenerated", "test.state"]}}}
+    commands = ["qrex.showGenerated", "qrex.hideGenerated", "test.state"]
+    return {"capabilities": {  # more than it answers: so many features a client has to cope with
+        "textDocumentSync": 1, "executeCommandProvider": {"commands": commands}, "codeActionProvider": True,
+        "completionProvider": {"triggerCharacters": ["@", "$"]}, "definitionProvider": True, "documentSymbolProvider": True,
+        "foldingRangeProvider": True, "hoverProvider": True, "inlayHintProvider": True, "referencesProvider": True,
+        "renameProvider": {"prepareProvider": True}, "signatureHelpProvider": {"triggerCharacters": ["("]},
+        "semanticTokensProvider": {"full": True, "legend": {"tokenModifiers": [], "tokenTypes": ["macro", "keyword"]}},
+        "workspaceSymbolProvider": True}}
 
 
 def execute(params):

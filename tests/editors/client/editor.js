@@ -129,6 +129,7 @@ function makeEditor(folder, settings, files) {
     Disposable, EventEmitter, Uri, Position, Range, Diagnostic, CancellationTokenSource, Task, ProcessExecution,
     version: '1.82.0',
     DiagnosticSeverity: { Error: 0, Warning: 1, Information: 2, Hint: 3 },
+    CodeActionKind: { Empty: { append: () => ({}) } },
     TaskGroup: { Build: 'build', Clean: 'clean' },
     ViewColumn: { Beside: -2 },
     env: { language: 'en', appName: 'test', onDidChangeTelemetryEnabled: new EventEmitter().event },
