@@ -34,7 +34,7 @@ syn region qrexLineComment start='/\*' end='\*/' contains=@Spell
 syn match qrexStatement '[+-]\%(cpp\|rc\|link\)\>' nextgroup=qrexScope,qrexSwitches skipwhite skipnl skipempty
 syn region qrexScope start='(' end=')' contained contains=qrexString nextgroup=qrexSwitches skipwhite skipnl skipempty
 syn cluster qrexText contains=qrexDirective,qrexConditional,qrexRepeat,qrexInclude,qrexDefine,qrexOperator,qrexPredefined,qrexSubstitution,qrexComment,qrexLineComment,qrexString
-syn region qrexSwitches matchgroup=qrexBrace start='{' end='}' contained contains=@qrexText,qrexSwitch
+syn region qrexSwitches matchgroup=qrexDelimiter start='{' end='}' contained contains=@qrexText,qrexSwitch
 syn match qrexSwitch '\%([^[:space:]{]\)\@1<![-/]\a[^[:space:]"'{}]*' contained
 
 hi def link qrexBadEscape Error

@@ -19,8 +19,12 @@ syn match qrexParameter '\h\w*' contained
 syn match qrexParameterType '\<\%(bool\|int\|double\|char\|string\)\>\ze\s\+\h' contained
 syn match qrexVariable '\h\w*' contained
 syn match qrexVariableType '\<\%(bool\|int\|double\|char\|string\)\>\ze\s\+\h' contained nextgroup=qrexVariable skipwhite
-syn match qrexLoop '(\_[^{}]\{-}\<in\>' contained contains=qrexIn,qrexParameter
+syn region qrexLoop matchgroup=qrexDelimiter start='(' end=')' contained contains=qrexLoopHead,@qrexLoopList
 syn match qrexIn '\<in\>' contained
+syn region qrexParens matchgroup=qrexDelimiter start='(' end=')' contained contains=@qrexLoopList
+syn match qrexLoopHead '\%(@\s*for\s*(\)\@30<=[^{}]\{-}\<in\>' contained contains=qrexIn,qrexParameter
+syn cluster qrexLoopList contains=qrexParens,qrexDirective,qrexPredefined,qrexOperator,qrexComment,qrexString,qrexNumber,qrexLineComment
+syn cluster qrexLoopList add=cString,cppString,cNumbers,cppNumbers,cComment,cCommentL
 
 syn match qrexPredefined '@macro\h\w*'
 syn match qrexPredefined '@\%(is_public_header\|is_header\|is_cpp\|root_to_file_path\|file_path\|filename\|filename_without_extension\)\>'
@@ -34,6 +38,7 @@ syn region qrexComment start='@\s*/\*' end='\*/' contains=@Spell
 hi def link qrexComment Comment
 hi def link qrexConditional PreCondit
 hi def link qrexDefine Define
+hi def link qrexDelimiter Delimiter
 hi def link qrexDirective PreProc
 hi def link qrexExported Operator
 hi def link qrexIn PreCondit
