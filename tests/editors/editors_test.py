@@ -225,7 +225,10 @@ def all_words_are_in_the_grammars(_binary):
     rules = {"@": ("macros", "definition variable loop directive python"), "@=": ("macros", "predefined"), "": ("qrex", "key"),
              "$": ("cpp", "heading enumeration calculated words warning"), "<<": ("cpp", "qualifiers")}
     missing = []
+    kate = set(re.findall(r"[A-Za-z_]\w*", (ROOT / "editors/kate/qrex.xml").read_text()))
     for kind, words in words_of_tool().items():
+        if kind in ("@", "@=", ""):
+            missing += [f"kate: {kind}{word}" for word in words - kate]
         grammar, names = rules[kind]
         repository = json.loads((EXTENSION / f"syntaxes/{grammar}.tmLanguage.json").read_text())["repository"]
         known = set(re.findall(r"[A-Za-z_]\w*", json.dumps([repository[name] for name in names.split()])))

@@ -9,7 +9,8 @@ const { test } = require('node:test');
 const ROOT = path.join(__dirname, '../../../editors/vscode');
 const { initializationOptions, serverCommand, toolCommand } = require(path.join(ROOT, 'src/options'));
 const { looksLikeSettings } = require(path.join(ROOT, 'src/settings_text'));
-const { problemMatchers, problemPatterns } = require(path.join(ROOT, 'package.json')).contributes;
+const manifest = require(path.join(ROOT, 'package.json'));
+const { problemMatchers, problemPatterns } = manifest.contributes;
 const REPOSITORY = path.join(__dirname, '../../..');
 
 const settings = (given) => ({ serverPath: '', configuration: '', arguments: [], clangdPath: null, ...given });
@@ -64,4 +65,13 @@ test('messages become problems at the lines of the sources', () => {
     'tree/zoo_app/src/zoo_app.cpp|46|warning|unused variable \'unused\' [-Wunused-variable]',
     'tree/zoo_app/src/zoo_app.cpp|12|5|error|with lineDirectives',
   ]);
+});
+
+test('what the manifest names is packed, and no sources are', async () => {
+  const { listFiles } = require(path.join(ROOT, 'node_modules/@vscode/vsce'));
+  const packed = await listFiles({ cwd: ROOT, dependencies: false });
+  const { grammars, languages, snippets } = manifest.contributes;
+  const named = [manifest.main, ...[...grammars, ...snippets].map((one) => one.path), ...languages.map((one) => one.configuration)];
+  assert.deepStrictEqual(named.map((name) => path.normalize(name)).filter((name) => !packed.includes(name)), []);
+  assert.deepStrictEqual(packed.filter((name) => /^(src|node_modules)/.test(name)), []);
 });
