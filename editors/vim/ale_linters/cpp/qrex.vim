@@ -1,0 +1,1 @@
+call qrex_ale#Define('cpp')

@@ -1,0 +1,22 @@
+;; A session with the settings of the file that QREX_SETTINGS names; prints the errors that are shown, and how the server was started.
+(load (getenv "QREX_SETTINGS") nil t)
+(require 'eglot)
+(setq eglot-sync-connect t)
+
+(defun wait-for-error ()
+  (eglot-ensure)
+  (run-hooks 'post-command-hook)
+  (let ((tries 0))
+    (while (and (< tries 200) (not (and (eglot-managed-p) (flymake-diagnostics))))
+      (setq tries (1+ tries))
+      (when (bound-and-true-p flymake-mode) (flymake-start))
+      (accept-process-output nil 0.05)))
+  (princ (format "%s\n" (mapcar #'flymake-diagnostic-text (flymake-diagnostics)))))
+
+(find-file "src/a.cpp")
+(wait-for-error)
+(find-file "../app.qrpj")
+(princ (format "%s\n" major-mode))
+(wait-for-error)
+(let ((state (jsonrpc-request (eglot--current-server-or-lose) :workspace/executeCommand '(:command "test.state"))))
+  (princ (format "%S\n" (plist-get (plist-get state :started) :options))))
