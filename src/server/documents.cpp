@@ -254,7 +254,7 @@ void Server::BringUpToDate() {
 
 void Server::ShowToClangd(Document& document) {
   const TextIndex& generated = m_world->TranslationOf(*document.file).generated;
-  if (m_clangd)
+  if (m_clangd && !m_world->TranslationOf(*document.file).IsUnknown())
     m_clangd->Show(m_world->GeneratedPathOf(*document.file), generated.Text(), document.file->kind != FileKind::C);
   if (document.isShown) Tell("qrex/generatedChanged", {{"uri", document.uri}, {"text", generated.Text()}});
 }

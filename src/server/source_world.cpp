@@ -168,8 +168,13 @@ void SourceWorld::Translate(ProjectFile& file, Translated& translated) {
   m_texts.Read(source, SourcePathOf(file), SourceTexts::Form::File);
   translated.source = TextIndex(source);
   KeepingFiles* const files = FilesOf(*file.project);
-  const bool isCopied = !files || !IsTranslated(*file.project) || !IsTranslated(file) || !IsTranslatedKind(file.kind);
-  translated.isFaulty = false;
+  const bool isCopied = !IsTranslated(*file.project) || !IsTranslated(file) || !IsTranslatedKind(file.kind);
+  translated.isFaulty = !isCopied && !files;
+  if (translated.isFaulty) {
+    const std::string config = m_settings->config + "|" + m_settings->platform;
+    return Take(Message(Severity::Warning, "", "project " + file.project->name + " has no configuration " + config)
+                    .At({SourcePathOf(file), 1, 0, 0}));
+  }
   if (isCopied) {
     translated.generated = translated.madeFrom = translated.source;
     translated.map = CharacterMap::OfCopy(source.size());

@@ -24,6 +24,7 @@ struct Translated {
   TextIndex madeFrom;           // of which source: another one while there are errors
   CharacterMap map;             // of these two
   bool isFaulty = false;
+  bool IsUnknown() const { return isFaulty && madeFrom.Text().empty(); }  // it never could be made
 };
 
 class SourceWorld : private MessageConsumer {

@@ -142,6 +142,25 @@ def nvim_session(_binary):
         equal([line for line in output if line.startswith("vim.lsp.start")], ["vim.lsp.start qrex w"] * 2 if newer else [])
 
 
+def nvim_tour(binary):
+    """The real server and clangd in Neovim, over examples/tour."""
+    need("nvim", "clangd-19")
+    server = Path(binary).resolve().parent / "qrex-lsp"
+    if not server.exists():
+        raise Skipped("qrex-lsp")
+    with session("lua") as (work, options):
+        shutil.rmtree(work)
+        shutil.copytree(ROOT / "examples/tour", work)
+        tour = work / "tour.qrex"
+        tour.write_text(tour.read_text().replace("../../runtime", str(ROOT / "runtime")))
+        (work.parent / "bin/qrex-lsp").unlink()
+        (work.parent / "bin/qrex-lsp").symlink_to(server)
+        output = run([*VIMS["nvim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
+                      "-c", f"luafile {HERE}/vim/tour.lua"], **options).splitlines()
+    equal(output, ["error: $dep flaot64 subtotal = { subtotal = pieces * price; };", "completes: Getpieces",
+                   'leads to: order.h int32 pieces : [ unit("piece"), 1 ];', "renamed: orders1::Order first_release;"])
+
+
 def vim_session(_binary):
     need("vim")
     if not Path("/usr/share/vim/vimfiles/pack/dist-bundle/opt/ale").is_dir():
@@ -244,5 +263,5 @@ def extension(_binary):
     run(["npm", "test", "--silent"], cwd=EXTENSION)
 
 
-run_tests([vim_groups, nvim_groups, nvim_session, vim_session, emacs_session, kate_colours, vim_types_of_files, vim_reads_the_log, all_words_have_colours_in_vim,
+run_tests([vim_groups, nvim_groups, nvim_session, nvim_tour, vim_session, emacs_session, kate_colours, vim_types_of_files, vim_reads_the_log, all_words_have_colours_in_vim,
            all_words_are_in_the_grammars, extension])
