@@ -109,11 +109,12 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (settings.fingerprints) m_prints.emplace(*this, dependencyFile);
   if (settings.schemas && !project.exported) m_schemas.emplace(*this, *settings.schemas, dependencyFile);
-  if (dependencyFileLoaded || m_prints) ReadTimes();
+  if ((dependencyFileLoaded || m_prints) && !TakeTimesAhead()) ReadTimes();
   for (ScannedFile* file : scanned) {
     file->needsWriting = MustTranslate(*this, *file, Prints());
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
+    if (timesAhead) timesAhead->End();  // a translation may run a script
     if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
@@ -148,6 +149,23 @@ void ProjectBuilder::ReadTimes() {
     m_objectsOf[file->index] = &*m_objects.try_emplace(std::move(asked[at]), Object{found[at]}).first;
     ++at;
   }
+}
+
+bool ProjectBuilder::TakeTimesAhead() {
+  const std::vector<TimesAhead::Stamps>* const known = timesAhead ? timesAhead->Of(project) : nullptr;
+  if (!known) return false;
+  m_objectsOf.resize(FileCount());
+  for (size_t i = 0; i < scanned.size(); ++i) {
+    const TimesAhead::Stamps& stamps = (*known)[i];
+    ScannedFile& file = *scanned[i];
+    file.times.source = stamps.source.time;
+    file.times.sourceSize = stamps.source.size;
+    file.times.target = stamps.translation.time;
+    file.times.targetSize = stamps.translation.size;
+    if (!RunsTools() || !HasObject(file.file)) continue;
+    m_objectsOf[file.index] = &*m_objects.try_emplace(paths.Object(file.file), Object{stamps.object}).first;
+  }
+  return true;
 }
 
 // A little more or less comes of what is met on the way.

@@ -11,6 +11,7 @@
 #include "builder/project_prints.h"
 #include "builder/project_schemas.h"
 #include "builder/scheduler.h"
+#include "builder/times_ahead.h"
 
 namespace qrex {
 
@@ -33,6 +34,7 @@ class ProjectBuilder : public BuildFiles {
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   Scheduler& scheduler;
+  TimesAhead* timesAhead = nullptr;  // not owned; null: nothing is read ahead
 
  private:
   struct Object {
@@ -50,6 +52,7 @@ class ProjectBuilder : public BuildFiles {
   void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
+  bool TakeTimesAhead();
   size_t ExpectedSteps() const;
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   bool Translate(ScannedFile& file);  // false: it failed, and the run goes on

@@ -253,6 +253,7 @@ bool LoadStream(std::string& out, const std::string& path) {
 }
 
 void LeftoverSweep::Beside(const std::string& path) {
+  ++m_writeCount;
   const auto [folder, isNew] = m_swept.insert(path.substr(0, path.rfind('/') + 1));
   if (!isNew) return;
   for (const std::string& name : platform::PlainFileNames(*folder)) {

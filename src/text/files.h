@@ -59,9 +59,11 @@ bool LoadStream(std::string& out, const std::string& path);  // as LoadText with
 class LeftoverSweep {
  public:
   void Beside(const std::string& path);  // to be called ahead of writing a file
+  size_t WriteCount() const { return m_writeCount; }
 
  private:
   std::unordered_set<std::string> m_swept;  // folders, with a slash at the end
+  size_t m_writeCount = 0;
 };
 
 // Replaces the file as a whole: written beside, then renamed, so that there is never a half-written file at `path`.
