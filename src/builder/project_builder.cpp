@@ -155,6 +155,7 @@ bool ProjectBuilder::TakeTimesAhead() {
   const std::vector<TimesAhead::Stamps>* const known = timesAhead ? timesAhead->Of(project) : nullptr;
   if (!known) return false;
   m_objectsOf.resize(FileCount());
+  m_objects.reserve(scanned.size());
   for (size_t i = 0; i < scanned.size(); ++i) {
     const TimesAhead::Stamps& stamps = (*known)[i];
     ScannedFile& file = *scanned[i];
@@ -322,15 +323,24 @@ std::unique_ptr<BuildStep> ProjectBuilder::ReportUnlinked(const Project& library
 std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
-  const std::vector<std::string> inputs = CollectLinkInputs(project, config);
   const FileStamp targetStamp = StampOf(target);
   const int64_t targetTime = targetStamp.time;
+  auto next = scanned.begin();  // most inputs are the objects of these, in their order
   auto stampOf = [&](const std::string& input) {
+    for (; next != scanned.end(); ++next) {
+      const size_t index = (*next)->index;
+      const auto* const object = index < m_objectsOf.size() ? m_objectsOf[index] : nullptr;
+      if (!object) continue;
+      if (object->first != input) break;
+      ++next;
+      return object->second.stamp;
+    }
     const auto known = m_objects.find(input);
     return known == m_objects.end() ? StampOf(input) : known->second.stamp;
   };
   std::vector<std::string> watched = LibrariesOfSwitches(project, config);
-  watched.insert(watched.end(), inputs.begin(), inputs.end());
+  const auto libraryCount = static_cast<std::ptrdiff_t>(watched.size());
+  for (std::string& input : CollectLinkInputs(project, config)) watched.push_back(std::move(input));
   auto isLater = [&](const std::string& input) {
     const int64_t time = stampOf(input).time;
     return time > targetTime || (time == targetTime && settings.made.contains(input));
@@ -353,7 +363,7 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
     settings.observer->IsStale(target, {cause, hasLater ? *later : "", hasLater ? stampOf(*later).time : 0});
   }
   m_linked = target;
-  return TargetStep(*this, target, inputs);
+  return TargetStep(*this, target, {watched.begin() + libraryCount, watched.end()});
 }
 
 // Nothing was translated, or met for the first time: the dependency file would hold what it holds.
