@@ -88,6 +88,7 @@ bool ProjectQueue::Clean(Project& project, ProjectConfig& config) {
 }
 
 bool ProjectQueue::Finish() {
+  if (m_timesAhead) m_timesAhead->End();
   return Guarded([&] { m_scheduler.WaitForAll(); });
 }
 
