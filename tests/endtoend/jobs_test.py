@@ -136,4 +136,5 @@ def test_make_grants_jobs(workspace):
 
 
 run_tests([test_log_and_outputs_are_those_of_one_job, test_translation_error_behind_running_compilers,
-           test_the_next_project_begins_beside_the_last_one, test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])
+           test_the_next_project_begins_beside_the_last_one, test_projects_see_what_those_ahead_of_them_have_written,
+           test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])
