@@ -269,6 +269,12 @@ void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarg
   WriteBesideAndRename(path, content, [](const std::string&) { return platform::Result(); });
 }
 
+void ReplaceOwnFile(const std::string& path, std::string_view content) {
+  if (!platform::WriteFile(Checked(path), content, platform::Existing::Refused)) {
+    ReplaceFile(path, content, ReadOnlyTarget::Replace);
+  }
+}
+
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path) {
   std::string bytes;
   if (!ReadWholeFile(bytes, path) || bytes.size() < kHeaderSize) return false;

@@ -72,6 +72,9 @@ class LeftoverSweep {
 enum class ReadOnlyTarget { Refuse, Replace };
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
 
+// The same for a file that only this process and its tools read: where there is none yet, it is written in place.
+void ReplaceOwnFile(const std::string& path, std::string_view content);
+
 // A 16-byte header (magic, CRC-32 by IEEE 802.3, signed 64-bit size, all little-endian), then the payload.
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path);
 // Raises FileException. A file that holds the same already is not replaced, but gets the present time.
