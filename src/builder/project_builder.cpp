@@ -320,24 +320,27 @@ std::unique_ptr<BuildStep> ProjectBuilder::ReportUnlinked(const Project& library
   return nullptr;
 }
 
+// Most are the objects of the files from `next` on, in their order.
+FileStamp ProjectBuilder::StampOfInput(const std::string& input, size_t& next) const {
+  for (; next < scanned.size(); ++next) {
+    const size_t index = scanned[next]->index;
+    const auto* const object = index < m_objectsOf.size() ? m_objectsOf[index] : nullptr;
+    if (!object) continue;
+    if (object->first != input) break;
+    ++next;
+    return object->second.stamp;
+  }
+  const auto known = m_objects.find(input);
+  return known == m_objects.end() ? StampOf(input) : known->second.stamp;
+}
+
 std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
   const FileStamp targetStamp = StampOf(target);
   const int64_t targetTime = targetStamp.time;
-  auto next = scanned.begin();  // most inputs are the objects of these, in their order
-  auto stampOf = [&](const std::string& input) {
-    for (; next != scanned.end(); ++next) {
-      const size_t index = (*next)->index;
-      const auto* const object = index < m_objectsOf.size() ? m_objectsOf[index] : nullptr;
-      if (!object) continue;
-      if (object->first != input) break;
-      ++next;
-      return object->second.stamp;
-    }
-    const auto known = m_objects.find(input);
-    return known == m_objects.end() ? StampOf(input) : known->second.stamp;
-  };
+  size_t next = 0;
+  auto stampOf = [&](const std::string& input) { return StampOfInput(input, next); };
   std::vector<std::string> watched = LibrariesOfSwitches(project, config);
   const auto libraryCount = static_cast<std::ptrdiff_t>(watched.size());
   for (std::string& input : CollectLinkInputs(project, config)) watched.push_back(std::move(input));

@@ -67,6 +67,7 @@ class ProjectBuilder : public BuildFiles {
   Objects::value_type& ObjectOf(const ScannedFile& file);
   void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
+  FileStamp StampOfInput(const std::string& input, size_t& next) const;
   std::unique_ptr<BuildStep> LinkIfStale();
   std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 

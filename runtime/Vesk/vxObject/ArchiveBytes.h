@@ -4,7 +4,6 @@
 
 @import "Vesk/vxObject/Numbers.h"
 
-#include <algorithm>
 #include <cstdlib>
 #include <cstring>
 #include <stdexcept>
