@@ -129,8 +129,8 @@ def add_tools(root, text):
         os.chmod(f"{root}/tools/{name}", 0o755)
 
 
-# Makes the object that the last `-o "..."` of its response file names, empty. A program: 300 shells would be measured.
-SLEEPING = r"""#include <stdio.h>
+# Makes the object that the last `-o "..."` of its response file names, empty. A program: shells would be measured.
+COMPILER = r"""#include <stdio.h>
 #include <string.h>
 #include <time.h>
 int main(int count, char** words) {
@@ -142,18 +142,37 @@ int main(int count, char** words) {
   for (char* next = text; (next = strstr(next, "-o \""));) object = next += 4;
   *strchr(object, '"') = 0;
   if (!fopen(object, "w")) return 2;
-  struct timespec tenth = {0, 100000000};
-  return nanosleep(&tenth, 0);
+  struct timespec pause = {0, NANOSECONDS};
+  return nanosleep(&pause, 0);
 }
 """
+
+
+def add_compiler(root, seconds):
+    add_tools(root, TOOL)
+    write(f"{root}/compiler.c", COMPILER)
+    command = ["gcc", "-O1", f"-DNANOSECONDS={int(seconds * 1e9)}", "-o", f"{root}/tools/gcc-4", f"{root}/compiler.c"]
+    subprocess.run(command, check=True)
 
 
 def sleeping_build(root, files):
     """A build whose compiler sleeps: `Qrex main.qrex jobs=N` in root."""
     workspace(root, "build", 1, files)
-    add_tools(root, TOOL)
-    write(f"{root}/sleeping.c", SLEEPING)
-    subprocess.run(["gcc", "-O1", "-o", f"{root}/tools/gcc-4", f"{root}/sleeping.c"], check=True)
+    add_compiler(root, 0.1)
+
+
+def used_header(root, users):
+    """A header that all sources import, and a compiler that costs nothing: `Qrex main.qrex jobs=2`, and `ninja -j2` of
+    the same commands with their response files."""
+    [names] = workspace(root, "build", 1, users)
+    add_compiler(root, 0)
+    rules = ["rule compile\n  command = tools/gcc-4 -c @$out.rsp\n  rspfile = $out.rsp\n"
+             '  rspfile_content = -g -Wall -I"tree/p0" -I"tree/p0/src" -I"tree" -o "$out" "$in"\n'
+             "rule archive\n  command = tools/ar rcs $out @$out.rsp\n  rspfile = $out.rsp\n  rspfile_content = $in\n"]
+    for name in names:
+        rules.append(f"build ninja/{name}.o: compile tree/p0/src/{name} | tree/p0/p0.h\n")
+    rules.append(f"build ninja/p0.a: archive {' '.join(f'ninja/{name}.o' for name in names)}\n")
+    write(f"{root}/build.ninja", "".join(rules))
 
 
 def compiled(root, files):

@@ -110,11 +110,12 @@ void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   for (ProjectFile* file : project.files) scanned.push_back(&GetScannedFile(*file));
   if (settings.fingerprints) m_prints.emplace(*this, dependencyFile);
   if (settings.schemas && !project.exported) m_schemas.emplace(*this, *settings.schemas, dependencyFile);
-  if (dependencyFileLoaded || m_prints) ReadTimes();
+  if ((dependencyFileLoaded || m_prints) && !TakeTimesAhead()) ReadTimes();
   for (ScannedFile* file : scanned) {
     file->needsWriting = MustTranslate(*this, *file, Prints());
     if (!file->needsWriting) continue;
     m_hasStaleFiles = true;
+    if (timesAhead) timesAhead->End();  // a translation may run a script
     if (settings.observer) settings.observer->IsStale(paths.Translated(file->file), WhyTranslated(*this, *file));
     if (settings.diagnostics) TraceWriter() << "* " << file->file.name << "\n";
   }
@@ -149,6 +150,24 @@ void ProjectBuilder::ReadTimes() {
     m_objectsOf[file->index] = &*m_objects.try_emplace(std::move(asked[at]), Object{found[at]}).first;
     ++at;
   }
+}
+
+bool ProjectBuilder::TakeTimesAhead() {
+  const std::vector<TimesAhead::Stamps>* const known = timesAhead ? timesAhead->Of(project) : nullptr;
+  if (!known) return false;
+  m_objectsOf.resize(FileCount());
+  m_objects.reserve(scanned.size());
+  for (size_t i = 0; i < scanned.size(); ++i) {
+    const TimesAhead::Stamps& stamps = (*known)[i];
+    ScannedFile& file = *scanned[i];
+    file.times.source = stamps.source.time;
+    file.times.sourceSize = stamps.source.size;
+    file.times.target = stamps.translation.time;
+    file.times.targetSize = stamps.translation.size;
+    if (!RunsTools() || !HasObject(file.file)) continue;
+    m_objectsOf[file.index] = &*m_objects.try_emplace(paths.Object(file.file), Object{stamps.object}).first;
+  }
+  return true;
 }
 
 // A little more or less comes of what is met on the way.
@@ -302,18 +321,30 @@ std::unique_ptr<BuildStep> ProjectBuilder::ReportUnlinked(const Project& library
   return nullptr;
 }
 
+// Most are the objects of the files from `next` on, in their order.
+FileStamp ProjectBuilder::StampOfInput(const std::string& input, size_t& next) const {
+  for (; next < scanned.size(); ++next) {
+    const size_t index = scanned[next]->index;
+    const auto* const object = index < m_objectsOf.size() ? m_objectsOf[index] : nullptr;
+    if (!object) continue;
+    if (object->first != input) break;
+    ++next;
+    return object->second.stamp;
+  }
+  const auto known = m_objects.find(input);
+  return known == m_objects.end() ? StampOf(input) : known->second.stamp;
+}
+
 std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
   if (project.targetType == TargetType::UtilityProject && IsGccFamily(settings.compiler)) return nullptr;  // no target
   const std::string target = paths.Target();
-  const std::vector<std::string> inputs = CollectLinkInputs(project, config);
   const FileStamp targetStamp = StampOf(target);
   const int64_t targetTime = targetStamp.time;
-  auto stampOf = [&](const std::string& input) {
-    const auto known = m_objects.find(input);
-    return known == m_objects.end() ? StampOf(input) : known->second.stamp;
-  };
+  size_t next = 0;
+  auto stampOf = [&](const std::string& input) { return StampOfInput(input, next); };
   std::vector<std::string> watched = LibrariesOfSwitches(project, config);
-  watched.insert(watched.end(), inputs.begin(), inputs.end());
+  const auto libraryCount = static_cast<std::ptrdiff_t>(watched.size());
+  for (std::string& input : CollectLinkInputs(project, config)) watched.push_back(std::move(input));
   auto isLater = [&](const std::string& input) {
     const int64_t time = stampOf(input).time;
     return time > targetTime || (time == targetTime && settings.made.contains(input));
@@ -336,7 +367,7 @@ std::unique_ptr<BuildStep> ProjectBuilder::LinkIfStale() {
     settings.observer->IsStale(target, {cause, hasLater ? *later : "", hasLater ? stampOf(*later).time : 0});
   }
   m_linked = target;
-  return TargetStep(*this, target, inputs);
+  return TargetStep(*this, target, {watched.begin() + libraryCount, watched.end()});
 }
 
 // Nothing was translated, or met for the first time: the dependency file would hold what it holds.

@@ -11,6 +11,7 @@
 #include "builder/project_prints.h"
 #include "builder/project_schemas.h"
 #include "builder/scheduler.h"
+#include "builder/times_ahead.h"
 
 namespace qrex {
 
@@ -33,6 +34,7 @@ class ProjectBuilder : public BuildFiles {
   void Clean(const std::string& dependencyFile);  // what could not be deleted counts as errors
 
   Scheduler& scheduler;
+  TimesAhead* timesAhead = nullptr;  // not owned; null: nothing is read ahead
 
  private:
   struct Object {
@@ -50,6 +52,7 @@ class ProjectBuilder : public BuildFiles {
   void AddLastStep(std::function<void(bool)> whenOver);
   void PrepareFiles(const std::string& dependencyFile);
   void ReadTimes();
+  bool TakeTimesAhead();
   size_t ExpectedSteps() const;
   bool RunsTools() const { return !project.exported && !settings.translateOnly; }
   bool Translate(ScannedFile& file);  // false: it failed, and the run goes on
@@ -64,6 +67,7 @@ class ProjectBuilder : public BuildFiles {
   Objects::value_type& ObjectOf(const ScannedFile& file);
   void ReportSharedObject(const std::string& path, const ProjectFile& file, const ProjectFile& other);
   void ReportUnregistered() const;
+  FileStamp StampOfInput(const std::string& input, size_t& next) const;
   std::unique_ptr<BuildStep> LinkIfStale();
   std::unique_ptr<BuildStep> ReportUnlinked(const Project& library);
 

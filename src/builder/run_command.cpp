@@ -143,7 +143,7 @@ ToolOutputs::~ToolOutputs() {
 
 CommandFile::CommandFile(LeftoverSweep& leftovers, std::string path, std::string_view text) : m_path(std::move(path)) {
   leftovers.Beside(m_path);
-  ReplaceFile(m_path, WithCarriageReturns(text), ReadOnlyTarget::Replace);
+  ReplaceOwnFile(m_path, WithCarriageReturns(text));
 }
 
 CommandFile::~CommandFile() { DeleteThoughReadOnly(m_path); }

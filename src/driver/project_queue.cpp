@@ -21,8 +21,20 @@ bool ProjectQueue::Guarded(Work work) {
   return false;
 }
 
+void ProjectQueue::Expect(const std::vector<std::unique_ptr<Project>>& projects) {
+  m_timesAhead.emplace(m_settings.leftovers);
+  for (const auto& project : projects) {
+    const ProjectConfig* const config = project->FindConfig(m_settings.config, m_settings.platform);
+    if (config && IsTranslated(*project)) {
+      m_timesAhead->Add(*project, *config, !project->exported && !m_settings.translateOnly);
+    }
+  }
+  m_timesAhead->Begin();
+}
+
 bool ProjectQueue::Build(Project& project, ProjectConfig& config) {
   Begun& begun = m_begun.emplace_back(m_settings, project, config, m_scheduler);
+  if (m_timesAhead) begun.builder.timesAhead = &*m_timesAhead;
   return Guarded([&] {
     begun.builder.Begin(DependencyFilePath(project, config), nullptr,
                         [this, &begun](bool succeeded) { End(begun, succeeded); });
@@ -76,6 +88,7 @@ bool ProjectQueue::Clean(Project& project, ProjectConfig& config) {
 }
 
 bool ProjectQueue::Finish() {
+  if (m_timesAhead) m_timesAhead->End();
   return Guarded([&] { m_scheduler.WaitForAll(); });
 }
 

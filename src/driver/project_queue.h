@@ -4,6 +4,8 @@
 
 #include <cstdint>
 #include <list>
+#include <memory>
+#include <optional>
 #include <string>
 
 #include "builder/project_builder.h"
@@ -15,6 +17,7 @@ class ProjectQueue {
  public:
   explicit ProjectQueue(ConfigSettings& settings) : m_settings(settings), m_scheduler(settings) {}
 
+  void Expect(const std::vector<std::unique_ptr<Project>>& projects);  // builds of these, in their order
   // These are false when an error ends the run, which is told then.
   bool Build(Project& project, ProjectConfig& config);
   bool Compile(Project& project, ProjectConfig& config, const ProjectFile& file);
@@ -40,6 +43,7 @@ class ProjectQueue {
   void End(Begun& begun, bool succeeded);
 
   ConfigSettings& m_settings;
+  std::optional<TimesAhead> m_timesAhead;
   std::list<Begun> m_begun;
   Scheduler m_scheduler;  // has steps of these
   int64_t m_errors = 0, m_warnings = 0;

@@ -184,6 +184,7 @@ bool WorkspaceRun::RunProjects(ScopeTimer& timer) {
     }
     GenerateWorkspace();
   } else {
+    if (m_settings.mode == RunMode::Build && !m_settings.rebuildAll) m_queue.Expect(m_workspace.projects);
     for (size_t i = 0; i < m_workspace.projects.size(); ++i) {
       Project& project = *m_workspace.projects[i];
       if (IsLeftAlone(project) || ProcessProject(project)) continue;

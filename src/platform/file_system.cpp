@@ -139,9 +139,16 @@ Result ReadFile(const std::string& path, std::string& content, Readable kind) {
   }
 }
 
-Result WriteFile(const std::string& path, std::string_view content) {
-  Descriptor file(path, O_WRONLY | O_CREAT | O_TRUNC);
+// To truncate also an empty file would have some file systems write it to the disk when it is closed.
+Result WriteFile(const std::string& path, std::string_view content, Existing existing) {
+  const int how = existing == Existing::Continued ? O_APPEND : existing == Existing::Refused ? O_EXCL : 0;
+  Descriptor file(path, O_WRONLY | O_CREAT | how);
   if (!file) return Result::OfCall(false);
+  if (existing == Existing::Replaced) {
+    struct stat status;
+    if (fstat(file.Number(), &status) != 0) return Result::OfCall(false);
+    if (status.st_size > 0 && ftruncate(file.Number(), 0) != 0) return Result::OfCall(false);
+  }
   while (!content.empty()) {
     const ssize_t written = write(file.Number(), content.data(), content.size());
     if (written < 0 && errno == EINTR) continue;

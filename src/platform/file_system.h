@@ -62,8 +62,9 @@ enum class Readable { PlainFile, AnyFile };
 Result ReadFile(const std::string& path, std::string& content, Readable kind = Readable::PlainFile);
 // Memory that is about to be filled is had faster in large pages. No more than a hint.
 void PreferLargePages(void* memory, size_t size);
-void ReserveText(std::string& text, size_t size);                     // as reserve, in large pages where it is large
-Result WriteFile(const std::string& path, std::string_view content);  // in place of what is there, read-only or not
+void ReserveText(std::string& text, size_t size);      // as reserve, in large pages where it is large
+enum class Existing { Replaced, Continued, Refused };  // the content of what is there, read-only or not
+Result WriteFile(const std::string& path, std::string_view content, Existing existing = Existing::Replaced);
 Result MakeEmptyFile(const std::string& path, bool keepExisting);
 Result RemoveFile(const std::string& path);  // of a link, the name alone
 Result RemoveTree(const std::string& path);  // well also where there is none

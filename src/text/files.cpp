@@ -253,6 +253,7 @@ bool LoadStream(std::string& out, const std::string& path) {
 }
 
 void LeftoverSweep::Beside(const std::string& path) {
+  ++m_writeCount;
   const auto [folder, isNew] = m_swept.insert(path.substr(0, path.rfind('/') + 1));
   if (!isNew) return;
   for (const std::string& name : platform::PlainFileNames(*folder)) {
@@ -266,6 +267,12 @@ void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarg
     throw FileException(platform::kErrorAccessDenied, path);
   }
   WriteBesideAndRename(path, content, [](const std::string&) { return platform::Result(); });
+}
+
+void ReplaceOwnFile(const std::string& path, std::string_view content) {
+  if (!platform::WriteFile(Checked(path), content, platform::Existing::Refused)) {
+    ReplaceFile(path, content, ReadOnlyTarget::Replace);
+  }
 }
 
 bool ReadCheckedFile(uint32_t magic, std::string& payload, const std::string& path) {

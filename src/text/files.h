@@ -59,9 +59,11 @@ bool LoadStream(std::string& out, const std::string& path);  // as LoadText with
 class LeftoverSweep {
  public:
   void Beside(const std::string& path);  // to be called ahead of writing a file
+  size_t WriteCount() const { return m_writeCount; }
 
  private:
   std::unordered_set<std::string> m_swept;  // folders, with a slash at the end
+  size_t m_writeCount = 0;
 };
 
 // Replaces the file as a whole: written beside, then renamed, so that there is never a half-written file at `path`.
@@ -69,6 +71,9 @@ class LeftoverSweep {
 // another run may just have set it again.
 enum class ReadOnlyTarget { Refuse, Replace };
 void ReplaceFile(const std::string& path, std::string_view content, ReadOnlyTarget readOnly = ReadOnlyTarget::Refuse);
+
+// The same for a file that only this process and its tools read: where there is none yet, it is written in place.
+void ReplaceOwnFile(const std::string& path, std::string_view content);
 
 uint32_t Crc32(std::string_view bytes);  // IEEE 802.3
 // A 16-byte header (magic, CRC-32 by IEEE 802.3, signed 64-bit size, all little-endian), then the payload.

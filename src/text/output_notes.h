@@ -1,9 +1,11 @@
 // What tools are about to write is noted in a file while they run: a run that is killed leaves word of what may be
 // half-written, and the next run deletes it. Stamps cannot tell: half an object is younger than its source.
 //
-// A checked file (text/files.h) with the magic 0x2AEF78F2; its payload are the paths, relative to the folder of the
-// run, as compact lengths and their bytes. It holds the outputs of all tools that run at the time, and is gone when
-// none does. Whoever reads or writes it holds the folder's lock, so that no such tool runs any more when it is read.
+// It begins with the magic 0x2AEF78F4, little-endian. Behind that, each record is a byte and a path, relative to the
+// folder of the run, as a compact length and its bytes: `+` ahead of a tool, `-` once its output is known to be whole.
+// A record goes behind those that are there: to replace the file for each tool cost more than to start the tool. One
+// that is cut off was never acted upon. The file is gone when no tool runs. Whoever reads or writes it holds the
+// folder's lock, so that no such tool runs any more when it is read.
 #pragma once
 
 #include <set>
@@ -24,10 +26,12 @@ class OutputNotes {
   void Remove(const std::vector<std::string>& paths);                         // known to be whole, or to be gone
 
  private:
-  void Save();
+  void Save(char mark, const std::vector<std::string>& paths);
+  std::string WholeText() const;
 
   const std::string m_path;
   std::multiset<std::string> m_noted;
+  size_t m_size = 0;  // of the file; 0: to be written as a whole
 };
 
 }  // namespace qrex

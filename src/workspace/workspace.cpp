@@ -180,7 +180,9 @@ void Workspace::SyncProjectGuids() {
   for (const auto& project : projects) guids[project->name] = project->guid;
   settings.leftovers.Beside(kGuidFile);
   try {
-    ReplaceFile(kGuidFile, GuidBytes(guids));
+    const std::string made = GuidBytes(guids);
+    const bool isAsRead = made == bytes && !platform::IsLink(kGuidFile) && TouchFile(kGuidFile, false);
+    if (!isAsRead) ReplaceFile(kGuidFile, made);
   } catch (const FileException&) {
     TraceWriter() << "Error : Couldn't write " << kGuidFile << "\n";
   }

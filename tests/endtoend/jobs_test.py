@@ -79,6 +79,27 @@ def test_translation_error_behind_running_compilers(workspace):
     equal(workspace.path("x64/Debug/bad/bad3.o").read_text().strip(), "int bad3;")
 
 
+# Compiles as cat does; that of `first` writes into a source of the project behind it.
+MEDDLER = r"""#!/bin/sh
+read -r text < "${2#@}"; object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}
+cat "${source%\"*}" > "$object"
+case $object in *first.o) echo 'int more;' >> tree/second/src/second.cpp;; esac
+"""
+
+
+@in_workspace({"all.qrex": SETTINGS, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "first" "second" }\n',
+               "tools/gcc-4": MEDDLER, "tools/ar": ARCHIVER, "tree/first/src/first.cpp": "int first;\n",
+               "tree/second/src/second.cpp": "int second;\n", "tree/first/src/first.qrpj": PROJECT % ("first", '"first.cpp"'),
+               "tree/second/src/second.qrpj": PROJECT % ("second", '"*.h" "second.cpp"'),
+               **{f"tree/second/src/h{number}.h": "" for number in range(500)}})
+def test_projects_see_what_those_ahead_of_them_have_written(workspace):
+    workspace.run("all.qrex")
+    for number, change in enumerate(("rm x64/Debug/first/first.o", "echo >> tree/first/src/first.cpp"), 2):
+        workspace.shell(change)
+        workspace.run("all.qrex")
+        equal(workspace.path("x64/Debug/second/second.o").read_text().count("more"), number)
+
+
 @in_workspace(files(False))
 def test_interrupt_leaves_nothing_half_made(workspace):
     for number in (signal.SIGINT, signal.SIGTERM, signal.SIGKILL):
@@ -115,4 +136,5 @@ def test_make_grants_jobs(workspace):
 
 
 run_tests([test_log_and_outputs_are_those_of_one_job, test_translation_error_behind_running_compilers,
-           test_the_next_project_begins_beside_the_last_one, test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])
+           test_the_next_project_begins_beside_the_last_one, test_projects_see_what_those_ahead_of_them_have_written,
+           test_interrupt_leaves_nothing_half_made, test_make_grants_jobs])

@@ -45,7 +45,7 @@ template <typename T, typename = std::enable_if_t<IsArithmetic<T>>>
 void Deserialise(InputArchive& ar, T& v) {
   if constexpr (std::is_same<T, bool>::value) {
     const octet_t number = *ar.Take(1);
-    if (number > 1) throw ArchiveError("not a bool");
+    if (number > 1) FailArchive("not a bool");
     v = number != 0;
   } else {
     ReadScalars(ar, &v, 1);
@@ -67,7 +67,7 @@ constexpr std::size_t LeastBytes<std::pair<A, B>> = LeastBytes<A> + LeastBytes<B
 
 inline std::size_t ReadCount(InputArchive& ar, std::size_t leastBytes) {
   const std::size_t count = ReadCompact(ar);
-  if (leastBytes > 0 && count > ar.Remaining() / leastBytes) throw ArchiveError("more elements than an archive holds");
+  if (leastBytes > 0 && count > ar.Remaining() / leastBytes) FailArchive("more elements than an archive holds");
   return count;
 }
 
@@ -162,7 +162,7 @@ void AddElement(T& v, Item&& item) {
   } else if constexpr (HasLess<typename T::key_type>) {
     v.insert(v.end(), std::move(item));
   } else {
-    throw ArchiveError("keys without an order");
+    FailArchive("keys without an order");
   }
 }
 
@@ -189,7 +189,7 @@ template <typename T, typename = std::enable_if_t<IsContainer<T>>, typename = vo
 void Deserialise(InputArchive& ar, T& v) {
   const std::size_t count = ReadCount(ar, LeastBytes<typename ContainerTraits<T>::element_type>);
   if constexpr (IsFixedArray<T>) {
-    if (count != static_cast<std::size_t>(v.size())) throw ArchiveError("fixed array of another size");
+    if (count != static_cast<std::size_t>(v.size())) FailArchive("fixed array of another size");
   }
   if constexpr (IsBlock<T>) {
     if constexpr (!IsFixedArray<T>) v.resize(count);
@@ -207,7 +207,7 @@ void ReadEnum(InputArchive& ar, E& v) {
   const int32 number = static_cast<int32>(ReadCompact(ar));
   if constexpr (Detects<EnumRecordExpression, E>) {
     if (number != 0 && !ar.m_limits.m_anyEnumNumber && !FindLabel(GetReflectedEnum<E>(), number)) {
-      throw ArchiveError("number without a label in an enumeration");
+      FailArchive("number without a label in an enumeration");
     }
   }
   v = static_cast<E>(number);
@@ -232,7 +232,7 @@ void CheckVariantTag(InputArchive& ar) {
     } else {
       count = static_cast<std::size_t>(GetReflectedVariant<T>().m_numItems);
     }
-    if (tag >= count) throw ArchiveError("unknown tag of a variant");
+    if (tag >= count) FailArchive("unknown tag of a variant");
   }
 }
 

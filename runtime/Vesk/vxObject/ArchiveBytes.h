@@ -4,7 +4,6 @@
 
 @import "Vesk/vxObject/Numbers.h"
 
-#include <algorithm>
 #include <cstdlib>
 #include <cstring>
 #include <stdexcept>
@@ -16,7 +15,9 @@ struct XTarget;
 class ArchiveError : public std::runtime_error {
  public:
   using std::runtime_error::runtime_error;
+  ~ArchiveError() override;
 };
+[[noreturn]] void FailArchive(ConstStringZ text);
 
 // Scalars are little-endian on every host. VESK_SWAP_SCALARS turns them around, so that a program on a little-endian
 // host can be tested as if it ran on the other kind; all sources of a program must agree on it.
@@ -37,7 +38,7 @@ class ByteBuffer {
     return *this;
   }
   ~ByteBuffer() { std::free(m_data); }
-  operator xvector<octet_t>() const { return xvector<octet_t>(begin(), end()); }
+  operator xvector<octet_t>() const;
 
   void Append(void const* data, std::size_t size) {
     if (size > m_capacity - m_size) Reserve(size);
@@ -59,13 +60,7 @@ class ByteBuffer {
     std::swap(m_size, rhs.m_size);
     std::swap(m_capacity, rhs.m_capacity);
   }
-  void Reserve(std::size_t more) {
-    const std::size_t capacity = std::max(m_size + more, 2 * m_capacity + 64);
-    void* data = capacity < more ? nullptr : std::realloc(m_data, capacity);
-    if (!data) throw std::bad_alloc();
-    m_data = static_cast<octet_t*>(data);
-    m_capacity = capacity;
-  }
+  void Reserve(std::size_t more);
 
   octet_t* m_data = nullptr;
   std::size_t m_size = 0;
@@ -98,13 +93,14 @@ struct ArchiveLimits {
 
 // Reads what an Archive wrote. After an error it is of no more use.
 struct InputArchive {
-  InputArchive() {}
-  explicit InputArchive(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits())
-      : m_bytes(std::move(bytes)), m_limits(limits) {
-    if (m_bytes.size() > limits.m_bytes) throw ArchiveError("archive larger than allowed");
-  }
-  explicit InputArchive(Archive const& archive, ArchiveLimits const& limits = ArchiveLimits())
-      : InputArchive(archive.m_bytes, limits) {}
+  InputArchive();
+  explicit InputArchive(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveLimits());
+  explicit InputArchive(Archive const& archive, ArchiveLimits const& limits = ArchiveLimits());
+  InputArchive(InputArchive const&);
+  InputArchive(InputArchive&&) noexcept;
+  InputArchive& operator=(InputArchive const&);
+  InputArchive& operator=(InputArchive&&) noexcept;
+  ~InputArchive();
 
   void Read(void* data, std::size_t size) {
     octet_t const* bytes = Take(size);
@@ -112,7 +108,7 @@ struct InputArchive {
   }
   // The next bytes, where they stand.
   octet_t const* Take(std::size_t size) {
-    if (size > Remaining()) throw ArchiveError("read beyond the end of an archive");
+    if (size > Remaining()) FailArchive("read beyond the end of an archive");
     octet_t const* bytes = m_bytes.data() + m_position;
     m_position += size;
     return bytes;
@@ -120,7 +116,7 @@ struct InputArchive {
   std::size_t Remaining() const { return m_bytes.size() - m_position; }
 
   void CountEmptyElement() {
-    if (++m_emptyElements > m_limits.m_emptyElements) throw ArchiveError("too many empty elements in an archive");
+    if (++m_emptyElements > m_limits.m_emptyElements) FailArchive("too many empty elements in an archive");
   }
 
   xvector<octet_t> m_bytes;
@@ -147,7 +143,7 @@ inline thread_local ReadingState t_reading;
 class ReadingScope {
  public:
   explicit ReadingScope(InputArchive& ar) : m_archive(ar), m_outer(t_reading.m_archive) {
-    if (ar.m_depth >= ar.m_limits.m_depth) throw ArchiveError("values nested too deeply in an archive");
+    if (ar.m_depth >= ar.m_limits.m_depth) FailArchive("values nested too deeply in an archive");
     ++ar.m_depth;
     t_reading.m_archive = &ar;
   }
@@ -174,7 +170,7 @@ Out WriteCompact(uint32 v, Out out) {
 }
 
 inline uint32 CompactValue(int64 v) {
-  if (v > 0xFFFFFFFF) throw ArchiveError("too large for a compact integer");
+  if (v > 0xFFFFFFFF) FailArchive("too large for a compact integer");
   return static_cast<uint32>(v);
 }
 

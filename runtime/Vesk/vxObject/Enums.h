@@ -39,7 +39,7 @@ class EnumBase {
   void Deserialise(InputArchive& ar) {
     const EnumBase value(static_cast<int32>(ReadCompact(ar)));
     if (N::LEN > 0 && value.Index() < 0 && !ar.m_limits.m_anyEnumNumber) {
-      throw ArchiveError("number without a label in an enumeration");
+      FailArchive("number without a label in an enumeration");
     }
     m_value = value.m_value;
   }

@@ -37,6 +37,12 @@ class ObjectNumbers {
 };
 
 struct WrittenObjects {
+  WrittenObjects();
+  WrittenObjects(WrittenObjects const&);
+  WrittenObjects(WrittenObjects&&);
+  WrittenObjects& operator=(WrittenObjects const&);
+  WrittenObjects& operator=(WrittenObjects&&);
+  ~WrittenObjects();
   // Answers the number, and whether the object is new.
   std::pair<std::size_t, bool> Insert(WrittenObject const& object, std::type_info const& type);
 

@@ -63,7 +63,7 @@ class openvariant {
   }
 
   void Serialise(Archive& ar) const {
-    if (m_value && !m_ops->m_serialise) throw ArchiveError("type of an openvariant cannot be archived");
+    if (m_value && !m_ops->m_serialise) FailArchive("type of an openvariant cannot be archived");
     ar << AnyValue::NameOf(m_ops);
     if (m_value) m_ops->m_serialise(ar, m_value, 0, 1);
   }

@@ -47,7 +47,7 @@ void WriteObjectMention(Archive& ar, ptr<I> const& object) {
   ptr<IPersistable> persistable;
   if (object && !ar.m_writesAddresses) {
     persistable = QueryInterface<IPersistable>(object);
-    if (!ClassOf(persistable)) throw ArchiveError("object is not persistable");
+    if (!ClassOf(persistable)) FailArchive("object is not persistable");
   }
   if (!WriteMention(ar, {object.Object(), persistable.Any(), WritePersistable}, typeid(void))) return;
   WriteClassOf(ar, *ClassOf(persistable));
@@ -151,7 +151,7 @@ void Deserialise(InputArchive& ar, pref<I>& reference) {
   if (position < 0) return;
   const ptr<IPersistable> object(ar.m_objects.m_list[position].m_persistable);
   const ptr<I> found = QueryInterface<I>(object);
-  if (!found) throw ArchiveError("reference to an object of another class");
+  if (!found) FailArchive("reference to an object of another class");
   reference = found;
 }
 
@@ -173,7 +173,7 @@ void Deserialise(InputArchive& ar, cref<C>& reference) {
     position = ReadReference(ar, MakeStruct<C>);
     if (position >= 0) fits = *ar.m_objects.m_list[position].m_type == typeid(C);
   }
-  if (!fits) throw ArchiveError("reference to an object of another class");
+  if (!fits) FailArchive("reference to an object of another class");
   if (position >= 0) reference = static_cast<C*>(ar.m_objects.m_list[position].m_self);
 }
 
@@ -207,7 +207,7 @@ ptr<I> ReadObject(xvector<octet_t> bytes, ArchiveLimits const& limits = ArchiveL
   pref<I> reference;
   try {
     ar >> reference;
-    if (ar.Remaining() > 0) throw ArchiveError("bytes behind the object");
+    if (ar.Remaining() > 0) FailArchive("bytes behind the object");
   } catch (...) {
     ar.m_objects.Destroy();
     throw;

@@ -22,7 +22,7 @@ enum EAnswer { AN_VALUES, AN_ERROR };
 // The results of an `ipc` call: generated text takes them out of an Archive.
 template <typename T>
 Archive& operator>>(Archive& ar, T& value) {
-  if (!ar.m_answer) throw ArchiveError("archive is not for reading");
+  if (!ar.m_answer) FailArchive("archive is not for reading");
   *ar.m_answer >> value;
   return ar;
 }
@@ -107,6 +107,8 @@ class Stub {
     if constexpr (Detects<InterfaceRecordExpression, I>) m_interface = &GetReflectedInterface<I>();
   }
   virtual ~Stub();
+  Stub(Stub const&) = delete;
+  void operator=(Stub const&) = delete;
 
   void Connect(ClientConnection& connection, uint32 object) {
     m_connection = &connection;
@@ -122,8 +124,8 @@ class Stub {
   void VisitPrefs(IPrefVisitor&) const {}
   void EvictDgsNodes() const {}
   void DestroyObject() { delete this; }
-  void Serialise(Archive&) const { throw ArchiveError("a remote object cannot be archived"); }
-  void Deserialise(InputArchive&) { throw ArchiveError("a remote object cannot be archived"); }
+  void Serialise(Archive&) const { FailArchive("a remote object cannot be archived"); }
+  void Deserialise(InputArchive&) { FailArchive("a remote object cannot be archived"); }
 
  protected:
   // The response is the stub's from here on.
@@ -138,7 +140,7 @@ class Stub {
   uint32 m_object = 0;
   mutable Archive m_message;
   mutable uint32 m_answer = 0;
-  mutable std::unique_ptr<PendingResponse> m_response;
+  mutable PendingResponse* m_response = nullptr;  // its own
 };
 
 // --- Server

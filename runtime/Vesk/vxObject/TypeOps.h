@@ -96,7 +96,7 @@ void SerialiseArray(Archive& ar, T const* array, ssize_t begin, ssize_t end) {
   if constexpr (IsSerialisable<T>) {
     for (ssize_t i = begin; i < end; ++i) ar << array[i];
   } else {
-    throw ArchiveError("type cannot be archived");
+    FailArchive("type cannot be archived");
   }
 }
 
@@ -105,7 +105,7 @@ void DeserialiseArray(InputArchive& ar, T* array, ssize_t begin, ssize_t end) {
   if constexpr (IsSerialisable<T>) {
     for (ssize_t i = begin; i < end; ++i) ar >> array[i];
   } else {
-    throw ArchiveError("type cannot be archived");
+    FailArchive("type cannot be archived");
   }
 }
 

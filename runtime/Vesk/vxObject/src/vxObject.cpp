@@ -1,4 +1,5 @@
-// Registered things and archives; the library's own registration, and the records of its interfaces.
+// Registered things, archives and remote calls; the library's own registration, and the records of its interfaces.
+// Programs need all of this.
 
 @import "Vesk/vxObject/IObject.h"
 @import "Vesk/vxObject/src/parts/text.h"
@@ -7,5 +8,6 @@
 @import "Vesk/vxObject/src/parts/registry.h"
 @import "Vesk/vxObject/src/parts/releases.h"
 @import "Vesk/vxObject/src/parts/objects.h"
+@import "Vesk/vxObject/src/parts/remote.h"
 
 vxDefineTarget(Vesk_vxObject, 1)

@@ -25,6 +25,42 @@ std::size_t ObjectNumbers::Of(void const* object, std::type_info const& type, st
   return m_table->insert({{object, type}, next}).first->second;
 }
 
+// --- What would otherwise be compiled wherever an archive is used
+
+WrittenObjects::WrittenObjects() = default;
+WrittenObjects::WrittenObjects(WrittenObjects const&) = default;
+WrittenObjects::WrittenObjects(WrittenObjects&&) = default;
+WrittenObjects& WrittenObjects::operator=(WrittenObjects const&) = default;
+WrittenObjects& WrittenObjects::operator=(WrittenObjects&&) = default;
+WrittenObjects::~WrittenObjects() = default;
+
+ArchiveError::~ArchiveError() = default;
+void FailArchive(ConstStringZ text) { throw ArchiveError(text); }
+
+ByteBuffer::operator xvector<octet_t>() const { return xvector<octet_t>(begin(), end()); }
+void ByteBuffer::Reserve(std::size_t more) {
+  const std::size_t capacity = std::max(m_size + more, 2 * m_capacity + 64);
+  void* data = capacity < more ? nullptr : std::realloc(m_data, capacity);
+  if (!data) throw std::bad_alloc();
+  m_data = static_cast<octet_t*>(data);
+  m_capacity = capacity;
+}
+
+InputArchive::InputArchive() = default;
+InputArchive::InputArchive(xvector<octet_t> bytes, ArchiveLimits const& limits)
+    : m_bytes(std::move(bytes)), m_limits(limits) {
+  if (m_bytes.size() > limits.m_bytes) throw ArchiveError("archive larger than allowed");
+}
+InputArchive::InputArchive(Archive const& archive, ArchiveLimits const& limits)
+    : InputArchive(archive.m_bytes, limits) {}
+InputArchive::InputArchive(InputArchive const&) = default;
+InputArchive::InputArchive(InputArchive&&) noexcept = default;
+InputArchive& InputArchive::operator=(InputArchive const&) = default;
+InputArchive& InputArchive::operator=(InputArchive&&) noexcept = default;
+InputArchive::~InputArchive() = default;
+
+// --- The objects of archives
+
 std::pair<std::size_t, bool> WrittenObjects::Insert(WrittenObject const& object, std::type_info const& type) {
   const std::size_t next = m_list.size() + 1;
   const std::size_t number = m_numbers.Of(object.m_object, type, next);

@@ -144,10 +144,10 @@ void ClientConnection::ReadAnswer(InputArchive& ar, Pending& pending) {
   if (ar.Remaining() > 0) throw RemoteError("bytes behind the values");
 }
 
-Stub::~Stub() {}
+Stub::~Stub() { delete m_response; }
 
 Archive& Stub::StubBegin(ssize_t method, PendingResponse* response) const {
-  m_response.reset(response);
+  delete std::exchange(m_response, response);
   if (!m_connection) throw RemoteError("stub without a connection");
   m_message = Archive();
   m_answer = response ? m_connection->NextAnswer() : 0;
@@ -159,7 +159,7 @@ Archive& Stub::StubBegin(ssize_t method, PendingResponse* response) const {
 
 void Stub::StubEnd() const {
   const Archive message = std::move(m_message);
-  const std::unique_ptr<PendingResponse> response = std::move(m_response);
+  const std::unique_ptr<PendingResponse> response(std::exchange(m_response, nullptr));
   if (response) {
     m_connection->Call(message, m_answer, *response);
   } else {

@@ -1,7 +1,0 @@
-// JSON.
-
-@import "Vesk/vxObject/src/parts/json_strings.h"
-@import "Vesk/vxObject/src/parts/json_tokens.h"
-@import "Vesk/vxObject/src/parts/json_numbers.h"
-@import "Vesk/vxObject/src/parts/json_reader.h"
-@import "Vesk/vxObject/src/parts/json_writer.h"
