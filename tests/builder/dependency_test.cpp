@@ -165,6 +165,8 @@ TEST_F(DependencyTest, Staleness) {
   SetTime("tree/app/a.h", 9);
   load(10, 10, 10, 9, 10, 10);  // through two imports
   EXPECT_EQ("x.cpp ", Stale());
+  load(10, 10, 10, 10, 72'000'000'000, 10);  // a time that is still to come is none
+  EXPECT_EQ("y.cpp ", Stale());
   std::filesystem::remove("qrexsource/x64/Debug/app/c.h");
   load(10, 10, 10, 10, 10, 10);  // a missing output concerns its own file only
   EXPECT_EQ("c.h ", Stale());

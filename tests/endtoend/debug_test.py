@@ -2,13 +2,11 @@
 """What debuggers show of programs: gdb with the printers of the runtime, and the file for the debugger of Visual Studio."""
 
 import re
-import sys
 import xml.etree.ElementTree as XmlTree
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from runtime_fixture import ROOT, TOUR, build  # noqa: E402
-from workspace_fixture import CACHE, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from runtime_fixture import ROOT, TOUR, build
+from workspace_fixture import CACHE, Workspace, equal, holds, lacks, need, run_tests
 
 PRINTERS = ROOT / "runtime/debug/vesk_gdb.py"
 NATVIS = ROOT / "runtime/debug/vesk.natvis"
@@ -78,7 +76,7 @@ VALUES = [("numbers", "vesk::DynArray<int32> numbers{1, 2}", "vesk::DynArray of 
           ("two", "vesk::Array<more::Refined, 2> two", "vesk::Array of length 2 = {Two, Two}")]
 
 
-def first_workspace(binary):
+def test_first_workspace(binary):
     """An enumeration by its label, and values of other kinds. The program names the printers itself; gdb loads them if it may."""
     need("g++", "gdb")
     with Workspace(binary, {}) as workspace:
@@ -103,7 +101,7 @@ def first_workspace(binary):
         holds(gdb(workspace, "zoo_app", *stop, "print leo.diet", options="-iex 'set auto-load safe-path /nowhere'"), "m_value = 1")
 
 
-def the_tour(binary):
+def test_the_tour(binary):
     """Values of all kinds, where they are set, stale, and where nothing is yet."""
     need("g++", "gdb")
     with build(binary, TOUR / "tree", "tour.qrws") as workspace:
@@ -167,7 +165,7 @@ def members(name):
     return words
 
 
-def natvis(_):
+def test_natvis(_):
     """By the schema, and what it names is declared in the runtime's headers, with as many parameters."""
     root = XmlTree.parse(NATVIS).getroot()
     equal(root.tag, SPACE + "AutoVisualizer")
@@ -187,4 +185,4 @@ def natvis(_):
             holds(re.search(rf"enum class {scope}\b[^;]*;", headers).group(), word)
 
 
-run_tests([first_workspace, the_tour, natvis])
+run_tests(globals())

@@ -10,25 +10,13 @@ import shutil
 import sys
 import time
 
-from workspace_fixture import Workspace, run_tests
+from workspace_fixture import SETTINGS, Workspace, run_tests
 
 SESSIONS = int(sys.argv[2]) if len(sys.argv) > 2 else 8
 FIRST_SEED = int(sys.argv[3]) if len(sys.argv) > 3 else 0
 EDITS = 12
 
-CONFIG = '''virtualTree = { "tree" }
-$EXPORT_LIB = "out/lib"
-$EXPORT_TRANSLATED_INCLUDE = "out/include"
-$EXPORT_UNTRANSLATED_INCLUDE = "out/source"
-workspaces = { "app" "vxObject" }
-config = "Debug"
-platform = "x64"
-translateOnly = true
-compiler = gcc
-PATH("x64") = { "/bin" }
-INCLUDE("x64") = { "/usr/include" }
-LIB("x64") = { "/usr/lib" }
-'''
+CONFIG = SETTINGS + 'workspaces = { "app" "vxObject" } translateOnly = true\n'
 PROJECT = '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n'
 IOBJECT = 'Vesk/vxObject/IObject.h'
 HEADERS = ['h0.h', 'h1.h', 'h2.h', 'h3.h', 'h4.h']
@@ -176,7 +164,7 @@ class Session:
             self.log.append('run')
 
 
-def an_incremental_run_ends_like_a_whole_one(binary):
+def test_an_incremental_run_ends_like_a_whole_one(binary):
     for seed in range(FIRST_SEED, FIRST_SEED + SESSIONS):
         with Workspace(binary, {}) as workspace:
             session = Session(workspace, seed)
@@ -187,4 +175,4 @@ def an_incremental_run_ends_like_a_whole_one(binary):
                 raise
 
 
-run_tests([an_incremental_run_ends_like_a_whole_one])
+run_tests(globals())

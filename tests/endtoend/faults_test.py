@@ -1,9 +1,8 @@
 #!/usr/bin/env python3
-"""Whole runs with faults: errors in the middle, faults of the disk, runs that are killed.
+"""Whole runs with faults: errors in the middle, what is in the way, other runs. Failing calls and kills: tests/faults.
 
 Usage: faults_test.py BINARY [TEST...]. Each test is a function that works in a folder of its own."""
 
-import fcntl
 import os
 import re
 import shutil
@@ -11,9 +10,9 @@ import stat
 import subprocess
 import time
 
-from run_fixture import (BINARY, DEPENDENCIES, TRANSLATED, EACH_RUN, JUNK, write, read, write_tree, run, expect, files_of,
-                         leftovers, contents, changed, edit, dependencies, run_named)
-from workspace_fixture import Skipped, holds, lacks
+from run_fixture import (BINARY, DEPENDENCIES, TRANSLATED, EACH_RUN, write, read, write_tree, run, expect, leftovers, contents, edit,
+                         run_named)
+from workspace_fixture import holds, lacks
 
 
 # --- Errors in the middle
@@ -129,60 +128,10 @@ def test_what_is_no_plain_file():
           '\nCompleted')  # a configuration may come through a pipe
 
 
-def test_full_disk():
-    write_tree({'tree/app/c.h': 'int c;\n' * 1000})
-    text = run(status=1, limit=4096)
-    holds(text, f'Error: File error ({TRANSLATED}c.h) : ')
-    expect(not os.path.exists(TRANSLATED + 'c.h'), 'half-written')
-    expect(not leftovers(), 'temporaries stay behind')
-    expect(dependencies()[0]['app/b.h'][1] != 0, 'what was finished is kept')
-    run()
-    whole = contents('qrexsource', 'out')
-    edit('tree/app/c.h', 'int c2;\n' * 1000)
-    run(status=1, limit=4096)
-    after = contents('qrexsource', 'out')
-    expect([path for path in whole if after[path] != whole[path]] in ([], [DEPENDENCIES]), 'the old files stay')
-    run()
-    expect(read(TRANSLATED + 'c.h').count(b'c2') == 1000, 'the next run recovers')
-
-
-def test_full_disk_on_a_file_system():
-    os.mkdir('small')
-    mount = subprocess.run(['mount', '-t', 'tmpfs', '-o', 'size=256k', 'tmpfs', 'small'], stderr=subprocess.DEVNULL)
-    if mount.returncode != 0:
-        raise Skipped('mount')
-    try:
-        os.chdir('small')
-        write_tree({'tree/app/c.h': 'int c;\n' * 20000})
-        text = run(status=1)
-        holds(text, f'Error: File error ({TRANSLATED}c.h) : There is not enough space on the disk.\n')
-        expect(not os.path.exists(TRANSLATED + 'c.h') and not leftovers(), 'half-written')
-    finally:
-        os.chdir('..')
-        subprocess.run(['umount', 'small'])
-
-
 # --- Runs that are killed
 
 def without_times(files):
     return {path: content for path, content in files.items() if path not in EACH_RUN}
-
-
-def test_leftovers_of_killed_runs_are_removed():
-    write_tree()
-    run()
-    wanted = without_times(contents('qrexsource', 'out'))
-    for path in files_of('qrexsource', 'out') + ['projects.guids']:
-        write(f'{path}.qrex-{os.getpid()}.part', JUNK)  # whose process does not matter: nobody holds it
-    others = ['projects.guids.qrex-12.part', 'projects.guids.part']  # of a run that goes on, of the user
-    for path in others:
-        write(path, JUNK)
-    held = open(others[0])
-    fcntl.flock(held, fcntl.LOCK_EX)
-    subprocess.run('find qrexsource out -type f ! -name "*.part" -delete', shell=True)
-    run()
-    expect(without_times(contents('qrexsource', 'out')) == wanted, contents('qrexsource', 'out').keys())
-    expect(sorted(leftovers()) == sorted(others), leftovers())
 
 
 def test_runs_at_the_same_time():

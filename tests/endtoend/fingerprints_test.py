@@ -2,12 +2,10 @@
 """What a build depends on beside the age of files: commands, keys, and inputs that became older."""
 
 import os
-import sys
 import time
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, equal, in_workspace, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, equal, in_workspace, run_tests
 
 # An object tells its command and source, a library or program what went into it.
 COMPILER = """#!/bin/sh
@@ -134,5 +132,4 @@ def test_make_compiles_for_another_switch(workspace):
         equal(workspace.changed(objects, "x64/**/*.o"), [])
 
 
-run_tests([test_whatever_differs_is_made_again, test_a_clock_that_was_ahead, test_damaged_prints_are_made_anew,
-           test_without_the_key_age_alone_counts, test_make_compiles_for_another_switch])
+run_tests(globals())

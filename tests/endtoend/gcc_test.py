@@ -1,11 +1,7 @@
 #!/usr/bin/env python3
 """Builds with the real tools of the gcc family: by the tool itself, and through the make files that it generates."""
 
-import sys
-from pathlib import Path
-
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
 
 # A program, a dynamic library that it uses, and a static library that both use.
 FILES = {
@@ -83,7 +79,7 @@ LIBRARIES = "out/lib/x64/Debug/*"
 
 
 @in_workspace(FILES, "g++")
-def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
+def test_builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     output = workspace.run("all.qrex")
     holds(output, "- base  [", "Linking...", "- shape  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
     equal(sorted(workspace.times(LIBRARIES)),
@@ -104,7 +100,7 @@ def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
 
 @in_workspace({**FILES, "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -fPIC }\n',  # debug data names the folder
                "tree/app/src/app.qrpj": FILES["tree/app/src/app.qrpj"].replace(" -Wl,-rpath,out/lib/x64/Debug", "")}, "g++")
-def a_built_tree_moves_and_two_checkouts_are_equal(workspace):
+def test_a_built_tree_moves_and_two_checkouts_are_equal(workspace):
     workspace.shell("mkdir -p one 'another one/b' && cp -r all.qrex tree one && cp -r all.qrex tree 'another one/b'")
     for folder in ("one", "another one/b"):
         holds(workspace.shell(f"cd '{folder}' && Qrex all.qrex"), "\nCompleted....")
@@ -114,7 +110,7 @@ def a_built_tree_moves_and_two_checkouts_are_equal(workspace):
 
 
 @in_workspace(FILES, "g++")
-def messages_point_at_the_source(workspace):
+def test_messages_point_at_the_source(workspace):
     workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
     workspace.append("tree/app/src/parts.cpp", "static int unused;\n")
     output = workspace.run("all.qrex")
@@ -132,7 +128,7 @@ def messages_point_at_the_source(workspace):
 
 
 @in_workspace(FILES, "g++")
-def link_errors_are_counted_and_leave_no_target(workspace):
+def test_link_errors_are_counted_and_leave_no_target(workspace):
     workspace.replace("tree/app/src/parts.cpp", "int Parts()", "int Other()")
     output = workspace.run("all.qrex")
     holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
@@ -156,16 +152,6 @@ PROGRAM_ALONE = {
 }
 
 
-@in_workspace(PROGRAM_ALONE, "g++", "make")
-def a_program_without_libraries_is_linked(workspace):
-    holds(workspace.run("all.qrex"), "Linking...\n", "\nCompleted....")
-    workspace.shell(PROGRAM, status=7)
-    workspace.shell("rm -r out x64 qrexsource")
-    workspace.run("all.qrex", "mode=gen")
-    workspace.shell(MAKE)
-    workspace.shell(PROGRAM, status=7)
-
-
 # A program that needs a prepackaged library, a library that a static subproject names, and an assembled file.
 BEHIND_A_LIBRARY = {
     **PROGRAM_ALONE,
@@ -185,7 +171,7 @@ BEHIND_A_LIBRARY = {
 
 
 @in_workspace(BEHIND_A_LIBRARY, "g++")
-def what_switches_name_reaches_the_program(workspace):
+def test_what_switches_name_reaches_the_program(workspace):
     def compile(function, value, output, switches="-c"):
         workspace.write("one.c", f"int {function}() {{ return {value}; }}\n")
         workspace.shell(f"mkdir -p vendor tree/x64/Debug && gcc {switches} -o {output} one.c")
@@ -208,7 +194,7 @@ def what_switches_name_reaches_the_program(workspace):
     workspace.shell(PROGRAM, status=74)
 
 
-def failing_tools_are_counted_and_the_next_run_recovers(binary):
+def test_failing_tools_are_counted_and_the_next_run_recovers(binary):
     need("g++")
     half_an_object = 'text=$(cat "${2#@}"); object=${text##* -o \\"}; echo half > "${object%%\\"*}"\n'
     compilers = {
@@ -232,19 +218,7 @@ def failing_tools_are_counted_and_the_next_run_recovers(binary):
 
 
 @in_workspace(FILES, "g++")
-def missing_tools_are_named_and_counted(workspace):
-    output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
-    holds(output, "ERROR: gcc-4 was not found on PATH\n", "\nCompleted with 0 warnings, 6 errors.")
-    workspace.run("all.qrex")
-    workspace.path(PROGRAM).unlink()
-    output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
-    holds(output, "ERROR: g++ was not found on PATH\n", "Return code : 127\n", "\nCompleted with 0 warnings, 1 errors.")
-    workspace.run("all.qrex")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
-@in_workspace(FILES, "g++")
-def captured_output_that_cannot_be_kept_is_an_error(workspace):
+def test_captured_output_that_cannot_be_kept_is_an_error(workspace):
     workspace.write("tools/gcc-4", "#!/bin/sh\nhead -c 3000000 /dev/zero | tr '\\0' x\n")
     output = workspace.shell("ulimit -f 2000; Qrex all.qrex")  # blocks: none of the files of a run is as large
     holds(output, "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
@@ -254,33 +228,13 @@ def captured_output_that_cannot_be_kept_is_an_error(workspace):
     equal(workspace.shell(PROGRAM), RESULT)
 
 
-@in_workspace(FILES, "g++")
-def an_interrupted_tool_ends_the_run(workspace):
-    workspace.write("tools/gcc-4", "#!/bin/bash\nkill -INT $$\n")
-    output = workspace.run("all.qrex", status=1)
-    holds(output, "- base  [", "Interrupted while running gcc-4\n")
-    lacks(output, "- shape  [")
-    assert not workspace.path("out1.txt").exists() and not workspace.path("x64/Debug/base/compiler.rsp").exists()
-    translated = workspace.times("qrexsource/**/base/**/*.*")
-    workspace.path("tools/gcc-4").unlink()
-    workspace.run("all.qrex")
-    equal(workspace.shell(PROGRAM), RESULT)
-    lacks(" ".join(workspace.changed(translated, "qrexsource/**/base/*.h")), "numbers.h")
-
-
-@in_workspace(FILES, "g++", "clang++")
-def the_other_compilers_of_the_family(workspace):
-    workspace.run("all.qrex", "compiler=clang")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
 # --- Make files. `ar` does not take the switches of the generated rules; a relocatable link serves.
 
 MAKE = "make -f make_all_x64_Debug AR='g++ -r'"
 
 
 @in_workspace(FILES, "g++", "make")
-def make_builds_the_same_targets(workspace):
+def test_make_builds_the_same_targets(workspace):
     workspace.run("all.qrex", "mode=gen")
     assert b"\r\n" in workspace.path("make_app_x64_Debug").read_bytes()
     workspace.shell("make AR='g++ -r'")
@@ -302,30 +256,4 @@ def make_builds_the_same_targets(workspace):
     equal(workspace.shell(PROGRAM), RESULT)
 
 
-@in_workspace(FILES, "g++", "make", "ccache")
-def make_takes_a_compiler_launcher(workspace):
-    workspace.run("all.qrex", "mode=gen")
-    # Without the cache that stands ahead of all compilers of the scripts: it counts what is compiled without the launcher as well.
-    environment = {"CCACHE_DIR": str(workspace.path("cache")), "PATH": f"{Path(workspace.binary).parent}:/usr/bin:/bin"}
-    workspace.shell(f"{MAKE} CXX='ccache g++'", **environment)
-    equal(workspace.shell(PROGRAM), RESULT)
-    workspace.shell("make dclean", **environment)
-    workspace.shell(f"{MAKE} CXX='ccache g++'", **environment)
-    holds(workspace.shell("ccache --print-stats", **environment), "direct_cache_hit\t5\n")
-
-
-run_tests([
-    builds_libraries_and_a_program_and_only_what_is_stale,
-    a_built_tree_moves_and_two_checkouts_are_equal,
-    messages_point_at_the_source,
-    link_errors_are_counted_and_leave_no_target,
-    a_program_without_libraries_is_linked,
-    what_switches_name_reaches_the_program,
-    failing_tools_are_counted_and_the_next_run_recovers,
-    missing_tools_are_named_and_counted,
-    captured_output_that_cannot_be_kept_is_an_error,
-    an_interrupted_tool_ends_the_run,
-    the_other_compilers_of_the_family,
-    make_builds_the_same_targets,
-    make_takes_a_compiler_launcher,
-])
+run_tests(globals())

@@ -2,11 +2,8 @@
 """A run that keeps going behind errors of translations: all are told, and what they do not touch is made."""
 
 import re
-import sys
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, run_tests
 
 COMPILER = '#!/bin/sh\nread -r text < "${2#@}"; object=${text#*-o \\"}; echo made > "${object%%\\"*}"\n'
 PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nsubproj { %s }\nqrex\n{ %s }\n'
@@ -83,4 +80,4 @@ def test_without_the_key_the_first_error_ends_the_run(workspace):
     lacks(log, "not translated")
 
 
-run_tests([test_all_errors_are_told, test_without_the_key_the_first_error_ends_the_run])
+run_tests(globals())

@@ -2,18 +2,15 @@
 """Compilers behind a launcher: compiler caches and farms, by the real programs of this machine."""
 
 import contextlib
-import filecmp
 import json
 import os
 import shutil
 import socket
 import subprocess
-import sys
 import time
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
 
 COUNT = 8
 PROJECT = """$TARGET_TYPE = "Console Application"
@@ -196,5 +193,4 @@ def test_equal_in_every_folder(binary):
             equal([name for name in made[0] if made[0][name] != made[1].get(name)], [])
 
 
-run_tests([test_ccache, test_distcc, test_sccache, test_icecc, test_the_missing_one_is_named, test_command_lines,
-           test_restored_outputs_count, test_equal_in_every_folder])
+run_tests(globals())

@@ -4,14 +4,10 @@
 import json
 import os
 import shutil
-import sys
 import time
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 GEN = ["all.qrex", "mode=gen", "ninja=true"]
 NOTHING = "ninja: no work to do.\n"
 HEAD = '$TARGET_TYPE = "{}"\n$ROOT_TO_PROJDIR = "{}"\n@import "common.inc"\n'
@@ -52,7 +48,7 @@ def edit(workspace, name, old, new):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def builds_what_a_run_builds(workspace):
+def test_builds_what_a_run_builds(workspace):
     """Each edit makes the same objects and targets as a run does in a copy, and their bytes are the same."""
     workspace.run("all.qrex")
     ninja = workspace.path("ninja")
@@ -84,7 +80,7 @@ def builds_what_a_run_builds(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def names(workspace):
+def test_names(workspace):
     """Configurations and projects by their names; all commands can be told."""
     workspace.run(*GEN)
     holds(workspace.shell("ninja app-Release"), "Translating Release|x64", "Linking out/lib/x64/Release/app")
@@ -108,7 +104,7 @@ def names(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def follows_changes(workspace):
+def test_follows_changes(workspace):
     """The file is written anew by itself; a changed switch compiles what has it."""
     workspace.run(*GEN)
     settle(workspace)
@@ -138,7 +134,7 @@ def follows_changes(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def stops_at_errors(workspace):
+def test_stops_at_errors(workspace):
     workspace.run(*GEN)
     edit(workspace, "tree/lib/src/lib.cpp", "return 1", "return one")
     text = workspace.shell("ninja -k 0", status=1, LC_ALL="C")
@@ -159,7 +155,7 @@ def stops_at_errors(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def translator_takes_its_time(workspace):
+def test_translator_takes_its_time(workspace):
     """Nothing is compiled ahead of what it includes. The tool is called as it was, also by a wrapper."""
     workspace.run(*GEN)
     workspace.write("slow", f'#!/bin/sh\nsleep 0.5\nexec "{workspace.binary}" "$@"\n')
@@ -169,7 +165,7 @@ def translator_takes_its_time(workspace):
     settle(workspace, "-j8")
 
 
-def clang_and_a_tree_elsewhere(binary):
+def test_clang_and_a_tree_elsewhere(binary):
     need("ninja", "clang++")
     with Workspace(binary, FILES) as workspace:
         workspace.write("a build/none", "")
@@ -180,24 +176,4 @@ def clang_and_a_tree_elsewhere(binary):
         equal(workspace.shell("cd 'a build' && ninja > log && ninja"), NOTHING)
 
 
-def tour(binary):
-    """The whole of an example by ninja alone. A touched header rebuilds what is of it."""
-    need("ninja", "g++")
-    with Workspace(binary, {}) as workspace:
-        shutil.copytree(ROOT / "examples/tour", workspace.folder, dirs_exist_ok=True,
-                        ignore=shutil.ignore_patterns("out", "qrexsource", "x64", "*.guids"))
-        workspace.replace("tour.qrex", "../../runtime", str(ROOT / "runtime"))
-        workspace.run("tour.qrex", "mode=gen", "ninja=true")
-        settle(workspace)
-        equal(workspace.shell("out/lib/x64/Debug/app"), (ROOT / "examples/tour/expected.txt").read_text())
-        time.sleep(0.01)
-        os.utime(workspace.path("tree/orders/api/kinds.h"))
-        equal(steps(workspace.shell("ninja")),
-              ["Compiling qrexsource/x64/Debug/app/src/app.cpp", "Compiling qrexsource/x64/Debug/orders/src/orders.cpp",
-               "Linking out/lib/x64/Debug/app", "Linking out/lib/x64/Debug/liborders.a", "Looking at translations of Debug|x64",
-               "Translating Debug|x64"])
-        equal(workspace.shell("ninja"), NOTHING)
-
-
-run_tests([builds_what_a_run_builds, names, follows_changes, stops_at_errors, translator_takes_its_time,
-           clang_and_a_tree_elsewhere, tour])
+run_tests(globals())

@@ -1,19 +1,11 @@
 #!/usr/bin/env python3
 """The status line of a build on a terminal, and messages of tools in colours there: seen through a pseudo terminal."""
 
-import fcntl
-import os
-import pty
 import re
 import signal
-import struct
-import subprocess
-import sys
-import termios
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+import terminal_fixture
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
 # Prints a warning, an error and a note, each with the lines that compilers add, where the source asks for it.
 COMPILER = r"""#!/bin/bash
@@ -40,28 +32,8 @@ FILES = {
 STATUS = re.compile(r"\[\d+/\d+\] (\d+ running, )?\d+:\d\d(, [^\x1b\r]*)?")
 
 
-def on_terminal(workspace, *arguments, columns=80, until=None, kill=None, **environment):
-    """What a run writes to a terminal, and its exit status. `until`: bytes, behind which the signal `kill` is sent."""
-    terminal, its_end = pty.openpty()
-    fcntl.ioctl(its_end, termios.TIOCSWINSZ, struct.pack("HHHH", 24, columns, 0, 0))
-    variables = {name: value for name, value in {**os.environ, "TERM": "xterm", **environment}.items() if value is not None}
-    process = subprocess.Popen([workspace.binary, "all.qrex", *arguments], cwd=workspace.folder, stdin=its_end, stdout=its_end,
-                               stderr=its_end, env=variables)
-    os.close(its_end)
-    output = b""
-    while True:
-        try:
-            part = os.read(terminal, 65536)
-        except OSError:  # the last writer has closed it
-            break
-        if not part:
-            break
-        output += part
-        if until and until in output:
-            os.kill(process.pid, kill)
-            until = None
-    os.close(terminal)
-    return output.decode().replace("\r\n", "\n"), process.wait(timeout=60)
+def on_terminal(workspace, *arguments, **options):
+    return terminal_fixture.on_terminal([workspace.binary, "all.qrex", *arguments], workspace.folder, **options)
 
 
 def shown(output):
@@ -150,5 +122,4 @@ def test_signals_leave_no_line(workspace):
         workspace.run("all.qrex", "jobs=2")  # which waits for the ends of the tools
 
 
-run_tests([test_line_is_shown_and_gone, test_terminals_that_take_less, test_messages_of_tools_are_coloured,
-           test_signals_leave_no_line])
+run_tests(globals())

@@ -6,13 +6,11 @@ import os
 import re
 import signal
 import subprocess
-import sys
 import time
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from browser_fixture import Browser, with_selenium  # noqa: E402
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from browser_fixture import Browser, with_selenium
+from workspace_fixture import ROOT, SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
 with_selenium()
 
@@ -231,7 +229,6 @@ def look_at_narrow_page(browser):
     browser.resize(1280, 900)
 
 
-ROOT = Path(__file__).resolve().parents[2]
 MODELS = r'''@import "Vesk/vxObject/IObject.h"
 @print("printed ")
 $interface+ IShape : vesk::IObject { float64 Area(int32 places = 2) const; };
@@ -355,5 +352,4 @@ def test_page_of_files_with_errors(workspace):
         holds(workspace.run("--report", *arguments, status=1), told)
 
 
-run_tests([test_page_without_a_build, test_page_of_files_with_errors, test_trace_tells_what_ran_when_and_why, test_trace_of_a_run_that_fails, test_files_that_cannot_be_written,
-           test_page_in_a_browser])
+run_tests(globals())

@@ -2,15 +2,10 @@
 """The key schemaLock: releases that are recorded stay as they are, whatever a run translates of them."""
 
 import shutil
-import subprocess
-import sys
 import time
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import ROOT, SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 LOCK = "kept/all.schemas"
 HEAD = "# Releases of models whose archives can be read. Kept by Qrex, to be committed.\n"
 IMPORT = '@import "Vesk/vxObject/IObject.h"\n'
@@ -68,7 +63,7 @@ def edit(workspace, name, old, new):
 
 
 @in_workspace(KEYED)
-def what_is_new_is_recorded(workspace):
+def test_what_is_new_is_recorded(workspace):
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES)
     before = workspace.times("**/*")
@@ -93,7 +88,7 @@ def what_is_new_is_recorded(workspace):
 
 
 @in_workspace(FILES)
-def without_the_key(workspace):
+def test_without_the_key(workspace):
     """Nothing is read or written; a target that is too low is a warning with compilableText alone."""
     edit(workspace, "app.cpp", "(app, 10)", "(app, 9)")
     workspace.write(LOCK, "<<<<<<< HEAD\n")
@@ -104,7 +99,7 @@ def without_the_key(workspace):
 
 
 @in_workspace(KEYED)
-def what_is_recorded_stays(workspace):
+def test_what_is_recorded_stays(workspace):
     """Each change is an error at the $schema, in this run and the next; taken back, all is well."""
     workspace.run("all.qrex")
     next_release = "and what is new as release 11"
@@ -141,7 +136,7 @@ def what_is_recorded_stays(workspace):
 
 
 @in_workspace(KEYED)
-def partial_runs(workspace):
+def test_partial_runs(workspace):
     """What a run does not see stays recorded, and what was changed in the lock itself is seen though no source is stale."""
     workspace.run("all.qrex")
     workspace.path(LOCK).unlink()
@@ -170,7 +165,7 @@ def partial_runs(workspace):
 
 
 @in_workspace(KEYED)
-def a_lock_that_is_none(workspace):
+def test_a_lock_that_is_none(workspace):
     workspace.run("all.qrex")
     edit(workspace, "other.h", "int32 a;", "int32 a; ")
     for text, line, told in [
@@ -204,7 +199,7 @@ def a_lock_that_is_none(workspace):
 
 
 @in_workspace(KEYED)
-def the_release_of_the_target(workspace):
+def test_the_release_of_the_target(workspace):
     workspace.run("all.qrex")
     edit(workspace, "other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 12: +b }")  # app.cpp is not stale by it
     told = "app.cpp(3) : error : The target of the project writes archives of release 10, and a $schema of it has release 12"
@@ -216,34 +211,4 @@ def the_release_of_the_target(workspace):
     holds(workspace.run("all.qrex", status=1), "define the target with 12")
 
 
-@in_workspace(KEYED)
-def branches_are_merged(workspace):
-    """Git merges what two branches record of different models; of one release it leaves a conflict, which is told."""
-    need("git")
-    git = "git -c user.name=a -c user.email=a@example.org "
-    workspace.write(".gitignore", "qrexsource/\nout/\n")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} init -q -b one && {git} add . && {git} commit -qm base && {git} checkout -qb two")
-    edit(workspace, "kinds.h", "low, high", "low, high, last")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam two && {git} checkout -q one")
-    edit(workspace, "other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam one && {git} merge -q two -m both")
-    workspace.run("all.qrex")
-    holds(lock(workspace), "app Other 10 = +b:int32\n", "low:0 high:1 last:2")
-    equal(workspace.shell(f"{git} status --porcelain"), "")
-    workspace.shell(f"{git} checkout -qb three")
-    edit(workspace, "other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; bool c;\n    $schema { 2: +a 10: +b 11: +c")
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 11)")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam three && {git} checkout -q one")
-    edit(workspace, "other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; int8 d;\n    $schema { 2: +a 10: +b 11: +d")
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 11)")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam four; {git} merge -q three -m all", status=1)
-    holds(workspace.run("all.qrex", status=1), f"{LOCK}(", ") : error : A merge has left a conflict here")
-
-
-run_tests([what_is_new_is_recorded, without_the_key, what_is_recorded_stays, partial_runs, a_lock_that_is_none, the_release_of_the_target,
-           branches_are_merged])
+run_tests(globals())

@@ -6,11 +6,8 @@ import glob
 import os
 import shutil
 import struct
-import sys
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Skipped, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Skipped, equal, holds, in_workspace, lacks, run_tests
 
 
 def tool(name):
@@ -127,7 +124,7 @@ def image(path):
 
 
 @in_workspace(all_files)
-def libraries_and_a_program(workspace):
+def test_libraries_and_a_program(workspace):
     output = workspace.run("all.qrex")
     holds(output, "- base  [Debug|Win64]", "Linking...\n", "- shape  [", "Compiling resource file shape/src/shape.rc\n",
           "Linking...\n", "- app  [", "Linking...\n", "\nCompleted....")
@@ -150,7 +147,7 @@ def libraries_and_a_program(workspace):
 
 
 @in_workspace(all_files)
-def messages_are_counted_and_point_at_the_source(workspace):
+def test_messages_are_counted_and_point_at_the_source(workspace):
     workspace.append("tree/base/src/base.cpp", "\nint Narrow()\n{\n    int unset;\n    return unset;\n}\n")
     workspace.append("tree/base/src/level.cpp", "int Broken()\n{\n    return nowhere;\n}\n")
     workspace.append("tree/app/src/app.cpp", "int wrong = nowhere;\n")
@@ -170,34 +167,4 @@ def messages_are_counted_and_point_at_the_source(workspace):
     image(workspace.path("out/lib/Win64/Debug/app.exe"))
 
 
-@in_workspace(all_files)
-def failing_steps_are_counted_and_the_next_run_recovers(workspace):
-    def fails(name, script, *messages):
-        original = workspace.path(f"tools/{name}").read_text()
-        workspace.write(f"tools/{name}", f"#!/bin/bash\n{script}\n")
-        output = workspace.run("all.qrex")
-        holds(output, *messages)
-        workspace.write(f"tools/{name}", original)
-        workspace.run("all.qrex")
-        lacks(workspace.output, "errors")
-        image(workspace.path("out/lib/Win64/Debug/app.exe"))
-
-    fails("mt.exe", "exit 31", 'mt.exe @"Win64/Debug/shape/mt.rsp" /nologo\nReturn code : 31\n',
-          "\nCompleted with 0 warnings, 2 errors.")
-    workspace.append("tree/shape/src/shape.rc", "2 VERSIONINFO\nBEGIN\nEND\n")
-    fails("rc.exe", "exit 1", "Compiling resource file shape/src/shape.rc\n", "Return code : 1\n",
-          "\nCompleted with 0 warnings, 1 errors.")
-    workspace.append("tree/app/src/app.cpp", "int more;\n")
-    fails("cl", 'echo x > Win64/Debug/app/app.obj; kill -KILL $$', "ERROR: cl was ended by signal 9\n",
-          "\nCompleted with 0 warnings, 1 errors.")
-    workspace.append("tree/app/src/app.cpp", "int other;\n")
-    fails("link.exe", 'echo x > out/lib/Win64/Debug/app.exe; kill -KILL $$',
-          "ERROR: link.exe was ended by signal 9\n", "Return code : 137\n", "Win64/Debug/app/linker.rsp:  /ENTRY:",
-          "\nCompleted with 0 warnings, 1 errors.")
-
-
-run_tests([
-    libraries_and_a_program,
-    messages_are_counted_and_point_at_the_source,
-    failing_steps_are_counted_and_the_next_run_recovers,
-])
+run_tests(globals())

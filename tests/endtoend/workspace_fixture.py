@@ -10,6 +10,7 @@ import tempfile
 import traceback
 from pathlib import Path
 
+ROOT = Path(__file__).resolve().parents[2]
 # A configuration for the tools of the gcc family; what is added behind it overrides.
 SETTINGS = """virtualTree = { "tree" }
 $EXPORT_LIB = "out/lib"
@@ -131,12 +132,15 @@ def in_workspace(files, *tools):
 
 
 def run_tests(tests):
-    """Calls with the binary each test, or those that the command line names; prints failures, skips and the closing line; ends
-    the process."""
+    """Calls with the binary each test, of a module's names those that begin with test_, or those that the command line names
+    (numbers are a script's own); prints failures, skips and the closing line; ends the process."""
+    if isinstance(tests, dict):
+        tests = [test for name, test in tests.items() if name.startswith("test_")]
     binary = os.path.abspath(sys.argv[1])
+    names = [argument for argument in sys.argv[2:] if not argument.isdigit()]
     passed = failed = skipped = 0
     for test in tests:
-        if sys.argv[2:] and test.__name__ not in sys.argv[2:]:
+        if names and test.__name__ not in names:
             continue
         try:
             test(binary)
