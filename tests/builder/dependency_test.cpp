@@ -217,11 +217,5 @@ TEST_F(DependencyTest, RegisteringFiles) {
   EXPECT_TRUE(registry.dirty && registry.entries.empty());
 }
 
-TEST_F(DependencyTest, Paths) {
-  EXPECT_EQ("qrexsource/x64/Debug", TranslationDirectory(builder->config));
-  EXPECT_EQ("qrexsource/x64/Debug/app.qrexdep", DependencyFilePath(App(), builder->config));
-  EXPECT_EQ("x64/Debug/app lib/x64/Debug", builder->paths.Intermediate() + " " + builder->paths.Library());
-}
-
 }  // namespace
 }  // namespace qrex

@@ -89,24 +89,6 @@ TEST_F(MpfwParserTest, ReadsStrings) {
   EXPECT_EQ("Expected quoted string when read 1", read("1", &MpfwParser::ReadStringOrExpression));
 }
 
-TEST_F(MpfwParserTest, ReadsNamedStrings) {
-  const auto read = [&](const std::string& text, bool isPath) {
-    return With(text, [&] {
-      std::string out = "old";
-      isPath ? parser.ReadNamedPath("N", out) : parser.ReadNamedString("N", out);
-      return out + "|" + Printed(parser.current);
-    });
-  };
-  EXPECT_EQ("$(x)|\"$(x)\"", read("$N = \"$(x)\" y", false));
-  EXPECT_EQ("Expected '$' when read N", read("N", false));
-  EXPECT_EQ("Expected 'N' when read M", read("$M", false));
-  EXPECT_EQ("Expected quoted string when read 'a'", read("$N = 'a'", false));
-  EXPECT_EQ("a/b|EOS", read("$N = \"a/b\"", true));
-  EXPECT_EQ("|y", read("$N = \"\" y", true));
-  EXPECT_EQ("Forward slashes must be used in \"a\\\\b\"", read("$N = \"a\\\\b\"", true));
-  EXPECT_EQ("Path can't end with a trailing slash : \"a/\"", read("$N = \"a/\"", true));
-}
-
 TEST_F(MpfwParserTest, Statements) {
   const auto import = [&](const std::string& text) {
     return With(text, [&] {

@@ -240,15 +240,6 @@ TEST_F(OutputPolicyTest, ReplacesLinksAlone) {
   EXPECT_EQ("Deleting out\nDeleting out\n", trace);
 }
 
-TEST_F(OutputPolicyTest, Deletes) {
-  Write("x", "");
-  ChangeReadOnly("x", true);
-  DeleteReporting("x");
-  DeleteReporting("x");
-  EXPECT_EQ("Deleting x\n", trace);
-  EXPECT_FALSE(FileExists("x"));
-}
-
 TEST_F(OutputPolicyTest, TimingLines) {
   { ScopeTimer silent; }
   EXPECT_EQ("", trace);

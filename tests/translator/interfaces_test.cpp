@@ -122,7 +122,6 @@ TEST_F(InterfacesTest, Faults) {
       {"$interface I : I { };", 1, "$interface I can't be its own base"},
       {"$interface I [ ] { };", 1, "Expected { after I when read ["},
       {"$interface I {\nvoid f() }; ", 2, "Expected ; after ) when read }"},
-      {"$interface I {\nvoid f(); }\nint", 3, "; expected after definition of $interface I when read int"},
       {"$model M { xvector<M> m; };\n$interface I { M a; };", 2, "Attribute a : $model M contains itself"},
   });
 }

@@ -16,14 +16,6 @@ class LoopTest : public TranslateTest {
   }
 };
 
-TEST_F(LoopTest, CopiesPlainText) {
-  const std::string text = "// a comment\n\n#include <vector>\nint f() { return 1; /* } */ }\n\tusing namespace std;\n";
-  EXPECT_EQ(text, Translate("a.cpp", text));
-  EXPECT_EQ("", Translate("b.cpp", ""));
-  EXPECT_EQ("int x = '$' ? 1 : 0; // $struct\nconst char* s = \"$class }\";",
-            Translate("c.c", "int x = '$' ? 1 : 0; // $struct\nconst char* s = \"$class }\";"));
-}
-
 TEST_F(LoopTest, WrapsHeaders) {
   EXPECT_EQ(
       "#pragma once\n#ifndef _app_src_sub_dir_my_file2_h\n#define _app_src_sub_dir_my_file2_h\n\nint x;"
@@ -141,10 +133,7 @@ TEST_F(LoopTest, ErrorsOfDirectives) {
       {"$new a::\n;", 2, "Expected identifier after :: when read ;"},
       {"$new a<", 1, "Reached end of stream while scanning for matching >"},
       {"$new a(", 1, "Reached end of stream while scanning for matching )"},
-      {"$init x", 1, "Expected { after init when read x"},
-      {"$uninit\n\nx", 3, "Expected { after uninit when read x"},
       {"$makefunctor nothing f { }", 1, "Unrecognised identifier : nothing"},
-      {"$enum e { x }; $makefunctor\ne f { }", 2, "Expected functor identifier after e when read f"},
   });
 }
 

@@ -57,10 +57,8 @@ TEST_F(WorkspaceFileTest, Messages) {
            {"'all' { }", "(1) : Expected double quoted string when read 'all'"},
            {"\"all\"\n(", "(2) : Expected { when read ("},
            {"\"all\" {\napp }", "(2) : Expected double quoted string when read app"},
-           {"\"all\" { \"app\"\n", "(1) : Expected double quoted string when read EOS"},
            {"\"all\" {\n\"a\\\\b\" }", "(2) : Forward slashes must be used in \"a\\\\b\""},
            {"\"all\" {\n\"none.qrws\"\n}", "(2) : Couldn't open workspace file none.qrws"},
-           {"@frob \"x\"", "(1) : Syntax error: @frob"},
        }) {
     AssertError(text, std::string("\ntree/all.qrws") + message + "\n");
   }
