@@ -178,9 +178,8 @@ add_library(stock_goods STATIC)
 qrex_translate(TARGET stock_goods WORKSPACE stock.qrex PROJECT goods)
 target_link_libraries(stock_goods PUBLIC Qrex::Runtime)
 """
-WAYS = ["add_subdirectory(../stock stock)",
-        "include(FetchContent)\nFetchContent_Declare(stock SOURCE_DIR ${CMAKE_CURRENT_SOURCE_DIR}/../stock)\n"
-        "FetchContent_MakeAvailable(stock)"]
+WAYS = ["add_subdirectory(../stock stock)", "include(FetchContent)\nFetchContent_Declare(stock SOURCE_DIR "
+        "${CMAKE_CURRENT_SOURCE_DIR}/../stock)\nFetchContent_MakeAvailable(stock)"]
 
 
 @of_example("make")

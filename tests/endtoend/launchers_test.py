@@ -4,13 +4,11 @@
 import contextlib
 import json
 import os
-import shutil
 import socket
 import subprocess
 import time
-from pathlib import Path
 
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, run_tests
 
 COUNT = 8
 PROJECT = """$TARGET_TYPE = "Console Application"
@@ -164,33 +162,6 @@ def test_command_lines(workspace):
     long = " ".join(f"-Wl,--trace-symbol={'x' * 1000}" for _ in range(3000))  # which the driver keeps to itself
     workspace.replace("tree/app/src/app.qrpj", "-MMD", f"-MMD {long}")
     equal(build(workspace, '""', "commandFiles=false").count("longer than the system's command lines"), 1)
-
-
-@in_workspace(files())
-def test_restored_outputs_count(workspace):
-    build(workspace, '""')
-    before = workspace.times("x64/**/*.o")
-    workspace.shell("find tree -type f -exec touch -d '1 minute' {} +")
-    workspace.run("all.qrex")
-    equal(workspace.changed(before, "x64/**/*.o"), [])
-
-
-def test_equal_in_every_folder(binary):
-    need("g++")
-    checkout = Path(__file__).parents[2]
-    for switches, variables in (("", {}), ('-g "-ffile-prefix-map=$(FOLDER)=."', {}), ("-g", {"PWD": "/proc/self/cwd"})):
-        made = []
-        with Workspace(binary, files(f"-DNAME=__FILE__ {switches}")) as one, \
-                Workspace(binary, files(f"-DNAME=__FILE__ {switches}")) as other:
-            for workspace in (one, other):
-                shutil.copytree(checkout / "examples" / "tour", workspace.path("tour"), ignore=lambda *_: ("out", "x64", "qrexsource"))
-                workspace.run(f'FOLDER="{workspace.folder}"', "all.qrex", **variables)
-                workspace.shell("cd tour && Qrex tour.qrex translateOnly=true "
-                                f"'virtualTree = {{ \"tree\" \"{checkout}/runtime\" }}'")
-                made.append({name: workspace.path(name).read_bytes() for name in workspace.times("**/*")
-                             if workspace.path(name).is_file() and not name.endswith((".guids", ".qrexdep"))})
-            assert len(made[0]) > 50 and "out/lib/x64/Debug/app" in made[0], sorted(made[0])
-            equal([name for name in made[0] if made[0][name] != made[1].get(name)], [])
 
 
 run_tests(globals())

@@ -117,15 +117,6 @@ def test_trace_of_a_run_that_fails(workspace):
     equal(page_data(workspace)["completed"], False)
 
 
-@in_workspace(FILES)
-def test_files_that_cannot_be_written(workspace):
-    workspace.write("file", "")
-    holds(workspace.run("all.qrex", 'buildTrace="file/trace.json"', status=1),
-          "Error: File error (file/trace.json)", "Completed with 1 warnings")
-    lacks(workspace.run("all.qrex", TRACE, "mode=clean"), "trace.json\n")
-    assert not workspace.path("out/trace.json").exists()
-
-
 def shown_steps(browser):
     """What the timeline shows undimmed, by the file or output of each."""
     return sorted(browser.run("""return [...document.querySelectorAll("rect.step:not(.dim)")].map((rect) => {
