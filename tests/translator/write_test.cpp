@@ -22,21 +22,6 @@ TEST(WriteTest, HolesWithinLines) {
             "f(1,2)");
 }
 
-TEST(WriteTest, HolesOfSeveralTexts) {
-  const auto text = Emitted([](TextWriter& out) {
-    std::string name = "K";
-    const auto vars = WithVars(out, "name"_ = name, "type"_ = std::string("int"), "word"_ = "static");
-    name = "L";  // each text has what was given
-    vars.Write("$word$ $type$ $name$;\n");
-    vars.Write(R"(
-      $name$ $value$
-          $lines$
-    )",
-               "value"_ = 1, "lines"_([&] { out << "a\nb\n"; }));
-  });
-  EXPECT_EQ(text, "static int K;\nK 1\n    a\n    b\n");
-}
-
 TEST(WriteTest, LinesAndMargins) {
   const auto text = Emitted([](TextWriter& out) {
     const Block block(out);
@@ -62,48 +47,6 @@ TEST(WriteTest, LinesAndMargins) {
             "        && a\n"
             "        && b; }\n"
             "    };\n"
-            "}\n");
-}
-
-TEST(WriteTest, UnderConditions) {
-  const auto text = Emitted([](TextWriter& out) {
-    const auto line = [&] { out << "line\n"; };
-    const std::string word = "word";
-    Write(out, R"(
-
-      f($no$$yes$);
-          $noLine$
-          $yesLine$
-          $noText$
-          $yesText$
-    )",
-          "no"_ = If(false, word), "yes"_ = If(true, word), "noLine"_ = If(false, line), "yesLine"_ = If(true, line),
-          "noText"_ = If(false, "text"), "yesText"_ = If(true, "text"));
-  });
-  EXPECT_EQ(text, "\nf(word);\n    line\n    text\n");
-}
-
-TEST(WriteTest, FurtherLinesWithinALine) {
-  const auto text = Emitted([](TextWriter& out) {
-    const auto twoLines = [&] { out << "map<int,\nint>"; };
-    Write(out, R"(
-      {
-          f($first$) { g($second$); }
-      }
-    )",
-          "first"_ = twoLines, "second"_ = "h(),\nk()\n");
-    const Block block(out);
-    out << "int a;\n";
-  });
-  EXPECT_EQ(text,
-            "{\n"
-            "    f(map<int,\n"
-            "    int>) { g(h(),\n"
-            "    k()\n"
-            "    ); }\n"
-            "}\n"
-            "{\n"
-            "    int a;\n"
             "}\n");
 }
 
