@@ -6,7 +6,6 @@ Usage: faults_test.py BINARY [TEST...]. Each test is a function that works in a 
 import os
 import re
 import shutil
-import stat
 import subprocess
 import time
 
@@ -108,24 +107,6 @@ def test_standard_output_that_takes_nothing():
     with os.fdopen(reading) as pipe:
         holds(pipe.read(), 'argv[60] = ', '\nCompleted')
     expect(process.wait() == 0, 'status')
-
-
-def test_what_is_no_plain_file():
-    write_tree()
-    run()
-    for path in ['tree/app/c.h', 'tree/app/n.txt', TRANSLATED + 'src/app.cpp', 'tree/.qrwsroot']:
-        os.remove(path)
-        os.mkfifo(path)
-    holds(run(status=1), "Couldn't open file tree/app/c.h\n")
-    holds(run('main.qrex', 'mode=show', '$COMPILE_FILE_PATH = "tree/app/a.h"', status=1), 'Search for .qrwsroot failed\n')
-    os.remove('tree/app/c.h')
-    write('tree/app/c.h', 'int c;\n')
-    text = run()
-    holds(text, f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n', '\nCompleted')
-    lacks(text, '...Copy file failed')
-    expect(stat.S_ISREG(os.stat(TRANSLATED + 'src/app.cpp').st_mode), 'the output is written anew')
-    holds(subprocess.run([BINARY, '/dev/stdin'], input=read('main.qrex'), stdout=subprocess.PIPE).stdout.decode(),
-          '\nCompleted')  # a configuration may come through a pipe
 
 
 # --- Runs that are killed

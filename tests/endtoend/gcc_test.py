@@ -1,7 +1,7 @@
 #!/usr/bin/env python3
 """Builds with the real tools of the gcc family: by the tool itself, and through the make files that it generates."""
 
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
 # A program, a dynamic library that it uses, and a static library that both use.
 FILES = {
@@ -127,20 +127,6 @@ def test_messages_point_at_the_source(workspace):
     equal(workspace.shell(PROGRAM), RESULT)
 
 
-@in_workspace(FILES, "g++")
-def test_link_errors_are_counted_and_leave_no_target(workspace):
-    workspace.replace("tree/app/src/parts.cpp", "int Parts()", "int Other()")
-    output = workspace.run("all.qrex")
-    holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
-          "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
-          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker '$ORIGIN' -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
-          "\nCompleted with 0 warnings, 1 errors.")
-    assert not workspace.path(PROGRAM).exists()
-    workspace.replace("tree/app/src/parts.cpp", "int Other()", "int Parts()")
-    workspace.run("all.qrex")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
 # A program that needs no library of the workspace, so that nothing else makes the folder of its target.
 PROGRAM_ALONE = {
     "all.qrex": SETTINGS,
@@ -194,29 +180,6 @@ def test_what_switches_name_reaches_the_program(workspace):
     workspace.shell(PROGRAM, status=74)
 
 
-def test_failing_tools_are_counted_and_the_next_run_recovers(binary):
-    need("g++")
-    half_an_object = 'text=$(cat "${2#@}"); object=${text##* -o \\"}; echo half > "${object%%\\"*}"\n'
-    compilers = {
-        "kill -SEGV $$": "ERROR: gcc-4 was ended by signal 11\n",
-        "exit 3": "Return code : 3\n",
-        "chmod a-w \"${object%%\\\"*}\"; exit 4": "Return code : 4\n",  # what it left is read-only
-        # A disk that takes no more than the first blocks of an object.
-        "trap '' XFSZ; ulimit -f 1; exec gcc \"$@\"": "error",
-    }
-    for ending, message in compilers.items():
-        with Workspace(binary, FILES) as workspace:
-            workspace.write("tools/gcc-4", f"#!/bin/bash\n{half_an_object}{ending}\n")
-            output = workspace.run("all.qrex")
-            holds(output, message, "\nCompleted with 0 warnings, ")
-            lacks(output, " 0 errors")
-            lacks(output, "Linking...")
-            equal(workspace.times(OBJECTS), {})
-            workspace.path("tools/gcc-4").unlink()
-            holds(workspace.run("all.qrex"), "\nCompleted....")
-            equal(workspace.shell(PROGRAM), RESULT)
-
-
 @in_workspace(FILES, "g++")
 def test_captured_output_that_cannot_be_kept_is_an_error(workspace):
     workspace.write("tools/gcc-4", "#!/bin/sh\nhead -c 3000000 /dev/zero | tr '\\0' x\n")
@@ -231,29 +194,6 @@ def test_captured_output_that_cannot_be_kept_is_an_error(workspace):
 # --- Make files. `ar` does not take the switches of the generated rules; a relocatable link serves.
 
 MAKE = "make -f make_all_x64_Debug AR='g++ -r'"
-
-
-@in_workspace(FILES, "g++", "make")
-def test_make_builds_the_same_targets(workspace):
-    workspace.run("all.qrex", "mode=gen")
-    assert b"\r\n" in workspace.path("make_app_x64_Debug").read_bytes()
-    workspace.shell("make AR='g++ -r'")
-    equal(workspace.shell(PROGRAM), RESULT)
-    equal(sorted(workspace.times(LIBRARIES)),
-          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
-
-    objects = workspace.times(OBJECTS)
-    workspace.shell(MAKE)
-    equal(workspace.changed(objects, OBJECTS), [])
-    workspace.append("tree/shape/shape.h", "int More();\n")
-    workspace.shell(MAKE)
-    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
-
-    workspace.shell("make dclean")
-    equal((workspace.times(OBJECTS), workspace.times("x64/**/*.d"), workspace.times(LIBRARIES)), ({}, {}, {}))
-    equal(workspace.times("qrexsource/**/*.cpp"), {})
-    workspace.shell(f"{MAKE} -j4")
-    equal(workspace.shell(PROGRAM), RESULT)
 
 
 run_tests(globals())

@@ -170,46 +170,6 @@ TEST(ScannerTest, Parser) {
 
 // --- Sections
 
-TEST(SectionsTest, Brackets) {
-  const auto section = [](const std::string& text, bool openAlreadyRead = false) {
-    return Outcome(text, [&](LexScanner& scanner) {
-      const TextRange range = ReadParenSection(scanner, openAlreadyRead);
-      return "<" + range.Text() + ">" + scanner.Text();
-    });
-  };
-  EXPECT_EQ("<> x", section("() x"));
-  EXPECT_EQ("<>", section(" ( )"));
-  EXPECT_EQ("<a (b) c>", section("( a (b) c /* ) */ )"));
-  EXPECT_EQ("<a \"(\" b ]}>;", section("(a \"(\" b ]});"));
-  EXPECT_EQ("<a>)", section("a))", true));
-  EXPECT_EQ("( expected when read [ at 1", section(" [a]"));
-  EXPECT_EQ("( expected when read EOS at 0", section(""));
-  EXPECT_EQ("Met EOS while reading bracketted section at 4", section("(a( "));
-}
-
-TEST(SectionsTest, Arguments) {
-  const auto arguments = [](const std::string& text) {
-    return Outcome(text, [&](LexScanner& scanner) {
-      std::string list;
-      for (;;) {
-        TextRange argument;
-        const LexToken end = ReadArgument(scanner, argument, kCloseParen);
-        list += "<" + argument.Text() + ">";
-        if (end.kind != kComma) return list + Printed(end) + scanner.Text();
-      }
-    });
-  };
-  EXPECT_EQ("<a><b>);", arguments("a, b);"));
-  EXPECT_EQ("<f(1, 2)><g[3, 4]>)", arguments("f(1, 2) , g[3, 4] /* c */)"));
-  EXPECT_EQ("<><>)", arguments(",)"));
-  EXPECT_EQ("<a,(b>) )", arguments(" `a,(b`) )"));
-  EXPECT_EQ("<a>x", arguments("`a`x"));
-  EXPECT_EQ("<({)><]>)", arguments("({), ])"));
-  EXPECT_EQ("Met EOS while reading argument b  at 5", arguments("a, b "));
-  EXPECT_EQ("Met EOS while reading argument (a, b) at 6", arguments("(a, b)"));
-  EXPECT_EQ("Met EOS while reading argument `a at 2", arguments("`a"));
-}
-
 TEST(SectionsTest, Blocks) {
   const auto block = [](const std::string& text, bool paren = false) {
     return Outcome(text, [&](LexScanner& scanner) {

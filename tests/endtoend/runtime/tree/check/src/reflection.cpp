@@ -93,24 +93,6 @@ ROW(Reflection) {
     CHECK(vesk::RegisterReflectedClass(&other, nullptr) == vesk::NSE_ALREADY_DEFINED, true);
 }
 
-ROW(Interfaces) {
-    shapes::Box box, other;
-    const vesk::ptr<shapes::INamedShape> both(&box);
-    const vesk::ptr<shapes::IShape> shape = both;
-    both->Scale(3);
-    shape->size = 4;
-    shape->colour = shapes::Green;
-    shape->named = vesk::ptr<shapes::INamed>(&other);
-    CHECK(both->Area(), 9);
-    CHECK(int32(shape->size), 4);
-    CHECK(vesk::string8(shape->label), "label");
-    CHECK(shape->colour == shapes::Green, true);
-    CHECK(shape->named->Name(), "box");
-    const vesk::ptr<vesk::IObject> object = both;
-    CHECK(object == vesk::ptr<vesk::IObject>(&box), true);
-    CHECK(bool(vesk::ptr<shapes::INamed>()), false);
-}
-
 ROW(Kinds) {
     using kinds::Value;
     vesk::xvector<Value> values;
