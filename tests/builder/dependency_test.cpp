@@ -203,18 +203,6 @@ TEST_F(DependencyTest, RegisteringFiles) {
   y.tail.isRegistered = true;
   MarkRegistered(y);
   EXPECT_FALSE(Scanned("app/b.h").tail.isRegistered);
-
-  DeclarationRegistry registry(true);
-  registry.Update("x.cpp", {});
-  EXPECT_FALSE(registry.dirty);
-  registry.Update("x.cpp", {"a", "b"});
-  EXPECT_TRUE(std::exchange(registry.dirty, false));
-  registry.Update("x.cpp", {"a", "b"});
-  EXPECT_FALSE(registry.dirty);
-  registry.Update("x.cpp", {"b", "a"});
-  EXPECT_TRUE(std::exchange(registry.dirty, false));
-  registry.Update("x.cpp", {});
-  EXPECT_TRUE(registry.dirty && registry.entries.empty());
 }
 
 }  // namespace

@@ -64,12 +64,6 @@ TEST_F(StepsTest, CommandsThatFail) {
   }
 }
 
-TEST_F(StepsTest, InterruptedCommandsEndTheRun) {
-  AddTool("stopped", "kill -INT $$\n");
-  ASSERT_EQ("Interrupted while running stopped",
-            MessageOf([&] { Run({.line = "cmd /c stopped x", .capturesOutput = true}); }));
-}
-
 // --- Steps
 
 // What a step is told and tells, in order: one of several commands, each of which ends with its status.

@@ -161,26 +161,6 @@ TEST_F(ConfigTest, Imports) {
               "\nbad(2) : Invalid option : bad\n\nmain.qrex(3) : while processing @import of bad\n");
 }
 
-TEST_F(ConfigTest, SearchOfImports) {
-  Write("p/x", "");
-  Write("tree/x", "");
-  Write("tree/y", "");
-  Write("more/y", "");
-  settings.context.importPaths = {"none", "p"};
-  settings.virtualTree = {"tree", "more"};
-  std::string found, root;
-  EXPECT_TRUE(FindImport(settings, "x", found));
-  EXPECT_EQ("p/x", found);
-  EXPECT_TRUE(FindImport(settings, "y", found));
-  EXPECT_EQ("tree/y", found);
-  EXPECT_TRUE(FindImport(settings, "more/y", found));
-  EXPECT_EQ("more/y", found);
-  EXPECT_FALSE(FindImport(settings, "z", found) || FindImport(settings, "tree", found));
-  std::filesystem::remove("tree/y");
-  EXPECT_TRUE(FindInTree(settings, "y", root, found));
-  EXPECT_EQ("more|more/y", root + "|" + found);
-}
-
 TEST_F(ConfigTest, Validation) {
   const std::string missing = "\nERROR:  Missing setting: ";
   const struct {

@@ -38,19 +38,6 @@ TEST_F(FrameTest, ImportsThatDisagree) {
   EXPECT_EQ("b", Find(e, "x"));  // the nearer one, though d is in view
 }
 
-TEST_F(FrameTest, NamesEndWithTheirFrame) {
-  {
-    LSFileFrame other(world);
-    Define(other, "x", "other");
-    Define(other, "x", "newer");
-  }
-  a.AddImport(b);
-  EXPECT_EQ("none", Find(a, "x"));
-  Define(b, "x", "b");
-  EXPECT_EQ("b", Find(a, "x"));
-  EXPECT_EQ("b", Find(b, "x"));
-}
-
 TEST_F(FrameTest, Substitutions) {
   a.AddOrderedImport(b);
   a.AddOrderedImport(c);

@@ -204,21 +204,5 @@ TEST_F(OutputPolicyTest, CopiesWhatDiffersWhereStampsAreNear) {
   EXPECT_EQ("...Copy file failed\n", trace);
 }
 
-TEST_F(OutputPolicyTest, TimingLines) {
-  { ScopeTimer silent; }
-  EXPECT_EQ("", trace);
-  {
-    ScopeTimer timer;
-    timer.Stop();
-    timer.Label() << "app";
-  }
-  EXPECT_TRUE(std::regex_match(TakeTrace(), std::regex("app\\.{85} [ \\d]{4}\\.\\d\\d ms\n")));
-  {
-    ScopeTimer timer(true);
-    timer.Label() << std::string(100, 'x');
-  }
-  EXPECT_TRUE(std::regex_match(TakeTrace(), std::regex("x{88} [ \\d]{4}\\.\\d\\d ms\n")));
-}
-
 }  // namespace
 }  // namespace qrex

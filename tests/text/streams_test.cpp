@@ -68,32 +68,6 @@ TEST(StreamsTest, Copies) {
   EXPECT_EQ(block, writer.TakeText());
 }
 
-TEST(TextWriterTest, Indentation) {
-  MemoryTextWriter writer;
-  writer.AddIndent(4);
-  writer << "a\n\nb";
-  EXPECT_EQ("    a\n    \n    b", writer.TakeText());
-  writer << "c\n";
-  EXPECT_EQ("c\n", writer.TakeText());
-  writer << 'd' << std::string(5000, 'e') << "\n";
-  EXPECT_EQ("    d" + std::string(5000, 'e') + "\n", writer.TakeText());
-  writer << "x\n";
-  {
-    IndentScope outer(writer, -4);
-    writer << "y\n";
-    {
-      IndentScope inner(writer, -4);
-      writer << "z\n";
-    }
-    writer << "w\n";
-  }
-  writer << "v";
-  EXPECT_EQ("    x\ny\nz\nw\n    v", writer.TakeText(false));
-  EXPECT_EQ("    x\ny\nz\nw\n    v", writer.TakeText());
-  EXPECT_EQ("", writer.TakeText());
-  EXPECT_EQ(4, writer.Indent());
-}
-
 TEST(TextWriterTest, Values) {
   MemoryTextWriter writer;
   writer << -1 << ' ' << uint64_t{18446744073709551615u} << ' ' << int64_t{INT64_MIN} << ' ' << 0.1 << ' ' << 1e30

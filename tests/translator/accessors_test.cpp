@@ -91,12 +91,6 @@ TEST_F(AccessorsTest, Paths) {
   EXPECT_EQ(Path(fields + "bool x;", "x"), ") { vesk::octet_t* p=_path.InitLocalBuffer(2); p[0]=128; p[1]=200; ");
 }
 
-// Constant steps count the dropped fields, in the order of addition.
-TEST_F(AccessorsTest, PathsOfASchema) {
-  EXPECT_EQ(Path("bool x; $dropped { bool d; } $schema { 1: +d 2: -d +x }", "x"),
-            ") { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=1; ");
-}
-
 TEST_F(AccessorsTest, WithOperations) {
   auto setter = [](const std::string& type, const std::string& operation) {
     return "    void Setx(" + type + " const& _v) { vesk::" + operation + "(S,GetxPath(),_model_.x,_v); }";
@@ -137,39 +131,6 @@ TEST_F(AccessorsTest, WithOperations) {
   for (const auto& [field, text] : kFields) {
     EXPECT_EQ(Accessors(" isa vesk::IObject", field, reading), Spelt(text) + "\n") << field;
   }
-}
-
-TEST_F(AccessorsTest, WithoutOperations) {
-  const struct {
-    const char *field, *text;
-  } kFields[] = {
-      {"offsettable<int8> x", R"(    void Offsetx(vesk::int8 const& _v) { W; _model_.x += _v; })"},
-      {"assignable<xvector<int32> > x", R"(    vesk::xvector<vesk::int32>& Writex() { W;  return _model_.x; }
-    void Setx(vesk::xvector<vesk::int32> const& _v) { W; _model_.x = _v; })"},
-      {"xset<movable<pref<I> > > x",
-       R"(    static void GetxElementPath(vesk::Path& _path,vesk::pref<I> const& _k0) { vesk::FieldPathArchive _ar; vesk::SerialiseVariableLengthUint(_ar,0); _ar << _k0; _ar.InitPath(_path); }
-    static vesk::Path GetxElementPath(vesk::pref<I> const& _k0) { vesk::Path _path; GetxElementPath(_path,_k0); return _path; }
-    bool InsertIntox(vesk::pref<I> const& _k0) { W; return _model_.x.Insert(_k0); }
-    bool DeleteFromx(vesk::pref<I> const& _k0) { W; return _model_.x.Delete(_k0); })"},
-      {"Inner x", R"(    
-    static void GetxyPath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(2); p[0]=0; p[1]=0; }
-    static vesk::Path GetxyPath() { vesk::Path _path; GetxyPath(_path); return _path; }
-    bool const& _model__xy() const { return _model_.x.y; }
-    bool& _model__xy() { return _model_.x.y; }
-    bool const& Getxy() const { vesk::DataSourceReadBarrier(&_model_.x.y,vesk::null,"K::_model_.x.y"); return _model_.x.y; }
-    bool& Writexy() { vesk::DataSourceWriteBarrier(&_model_.x.y,vesk::null,"K::_model_.x.y");  return _model_.x.y; }
-    void Setxy(bool const& _v) { vesk::DataSourceWriteBarrier(&_model_.x.y,vesk::null,"K::_model_.x.y"); _model_.x.y = _v; })"},
-  };
-  for (const auto& [field, text] : kFields) {
-    EXPECT_EQ(Accessors("", field, "R; return _model_.x; }\n"), Spelt(text) + "\n") << field;
-  }
-}
-
-TEST_F(AccessorsTest, BarriersOfAnObject) {
-  EXPECT_EQ(
-      Section(Mixin(" <<-genop>> isa I", "int32 x"), "K_model& model() { return _model_; }\n", "    K_model _model_"),
-      Spelt("    K_model const& read() const { vesk::DataSourceReadBarrier(C, C,\"K\"); return _model_; }\n"
-            "    K_model & write() { vesk::DataSourceWriteBarrier(S, S,\"K\"); return _model_; }\n"));
 }
 
 TEST_F(AccessorsTest, OperatorsOfAttributes) {

@@ -51,34 +51,6 @@ TEST_F(InterfacesTest, AttributesBecomeMethods) {
             "        {\n            0xe1,0xa2,0x07,0x00,0x00,0x00,0x04\n        }");
 }
 
-TEST_F(InterfacesTest, ClassThatImplementsADerivedInterface) {
-  const std::string declarations =
-      "$interface+ A : vesk::IObject { };\n$interface+ B : A { };\n$interface U { };\n$class+ K isa U, B { };\n";
-  const std::string header = TranslateHeader(declarations).header;
-  EXPECT_EQ(Messages(),
-            "t.h(5) : warning W1003 : isa on $interface U doesn't inherit from IObject\n"
-            "t.h(4) : see declaration of $interface U\n"
-            "t.h(5) : warning W1013 : isa on $interface U not reflected\n"
-            "t.h(4) : see declaration of $interface U\n");
-  EXPECT_EQ(Section(header, "using_model_base_class = 0;\n};\n", "} // namespace vesk"),
-            R"(template<> struct directly_implements_interface<K,U> { static const bool value = true; };
-template<> struct directly_implements_interface<K,B> { static const bool value = true; };
-template<> struct indirectly_implements_interface<K,vesk::IObject> { static const bool value = true; };
-template<> struct indirectly_implements_interface<K,A> { static const bool value = true; };
-)");
-  const std::string tail = TranslateHeader(declarations).tail;
-  EXPECT_EQ(Section(tail, "sfnCreateInstance()\n", "    vesk::ReflectedClass"),
-            "    {\n        return static_cast<vesk::ptr<B> >(new K());\n    }\n");
-  EXPECT_EQ(Section(Folded(tail), "K_interfaces[] = ", "\n"), "{ \"vesk::IObject\", \"A\", \"U\", \"B\", };");
-  EXPECT_EQ(Section(tail, "            K_interfaces,", "            {\n"),
-            "2,2,\n            &vesk::IObject::Stubs<K>::GetTable(),\n            &K::sfnCreateInstance,\n");
-  EXPECT_EQ(tail.find("GetReflectedInterface<U >"), tail.npos);
-  for (const std::string base : {"vesk::IObject", "A", "B"}) {
-    EXPECT_EQ(Section(tail, "if (&_ri == &vesk::GetReflectedInterface<" + base + " >()) ", "\n"),
-              "{ vesk::ptr<" + base + "> p(this); return reinterpret_cast<vesk::AnyInterface&>(p); }");
-  }
-}
-
 TEST_F(InterfacesTest, Warnings) {
   TranslateHeader(R"($interface U { };
 $interface+ A : vesk::IObject { };

@@ -61,30 +61,6 @@ TEST_F(MixinsTest, Faults) {
   });
 }
 
-// What the archive functions of a model in a class call is declared ahead of the outermost class, where there is one.
-TEST_F(MixinsTest, ArchivesInPlace) {
-  const std::string model = " : model { int32 a; } ";
-  const std::pair<std::string, bool> cases[] = {
-      {"$struct S" + model + "{ int other; };", false},
-      {"$struct S { $model { int32 a; } };", false},
-      {"$struct S : mixin [ M ] { };\n$model Own { int32 a; };", false},
-      {"$struct S<typename T> { };\n$struct U" + model + "{ };", false},
-      {"$struct S<typename T>" + model + "{ };", true},
-      {"$struct S<typename T> { $model { int32 a; } };", true},
-      {"$struct S { int a[2] = { }; $struct In" + model + "{ }; };", true},
-      {"$struct S { $struct In { $model { int32 a; } }; };", true},
-      {"$struct S : mixin [ model { int32 a; } ] { };", true},
-      {"$mixin S" + model + "{ };", true},
-  };
-  for (const bool wanted : {true, false}) {
-    settings.compilableText = wanted;
-    for (const auto& [text, inPlace] : cases) {
-      const std::string header = TranslateHeader("$mixin M { };\nnamespace n { " + text + " }").header;
-      EXPECT_EQ(header.find("} //n\nnamespace vesk\n{\n    RSN ") != std::string::npos, wanted && inPlace) << text;
-    }
-  }
-}
-
 // Functions are friends where they stand in a class, not where it is only called nested.
 TEST_F(MixinsTest, FriendsOfNestedClasses) {
   settings.compilableText = true;

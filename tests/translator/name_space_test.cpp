@@ -192,26 +192,6 @@ TEST_F(LookUp, ForwardDeclarationsInClasses) {
       {{"$struct K { $struct N; };\n$enum N { n };", 2, "$enum N conflicts with previous declaration of $struct N"}});
 }
 
-TEST_F(NameSpaceTest, Conflicts) {
-  const struct {
-    std::string text;
-    int line;
-    std::string error, place;  // where the error sends the reader
-  } cases[] = {
-      {"\n$struct A;\n$class A;", 3, "$class A conflicts with previous declaration of $struct A",
-       "(2) : see declaration of $struct A"},
-      {"namespace n { $enum+ E { x };\n$struct E { }; }", 2,
-       "$struct E conflicts with previous declaration of $enum+ n::E", "(1) : see declaration of $enum+ n::E"},
-      {"\nnamespace n { }\n$enum n { x };", 3, "$enum n conflicts with previous declaration of $namespace n",
-       "(2) : see declaration of $namespace n"},
-      {"$struct B { };\n$struct B { };", 2, "Repeated definition of $struct B", "(1) : see declaration of $struct B"},
-  };
-  for (const auto& [text, line, error, place] : cases) {
-    AssertErrors({{text, line, error}});
-    EXPECT_EQ("t.h" + place + "\n", Messages());
-  }
-}
-
 // --- Qualifiers and `+`
 
 TEST_F(NameSpaceTest, Modifiers) {

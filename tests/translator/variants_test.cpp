@@ -23,20 +23,6 @@ TEST_F(VariantsTest, Serialisability) {
   EXPECT_TRUE(serialises("$variant W <<ser -ar>> { int32; }; $variant V { W w; };"));
 }
 
-TEST_F(VariantsTest, Messages) {
-  AssertMessages({
-      {"\n$variant V <<copy>> { int32; };",
-       "t.h(2) : warning W1004 : $variant V is not reflected and has redundant << >> directives\n"},
-      {"$variant V <<os -ar multiline extern>> { int32; };", ""},
-      {"$variant V; $variant V; $variant V { V* next; };", ""},
-      {"$enum E { a };\n$variant+ V { E e; };",
-       "t.h(2) : warning W1002 : Reflected $variant+ V references non-registered $enum E\n"
-       "t.h(1) : see declaration of $enum E\n"},
-      {"$variant V { { int32 : [ 1 ] a; } s; };",
-       "t.h(1) : warning W1001 : Non-reflected $variant V contains metadata\n"},
-  });
-}
-
 TEST_F(VariantsTest, Errors) {
   AssertErrors({
       {"$struct S {\n$variant+ V { int32; }; };", 2, "'+' modifier not permitted on nested variant"},

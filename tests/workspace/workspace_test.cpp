@@ -88,13 +88,6 @@ class GraphTest : public WorldTest {
   Project& Named(const char* name) { return *workspace->FindProjectByName(name); }
 };
 
-TEST_F(GraphTest, ProjectPaths) {
-  EXPECT_EQ("lib/Util/src/Util.qrpj", ProjectPathOf("lib/Util"));
-  EXPECT_EQ("a/b.QRPJ", ProjectPathOf("a/b.QRPJ"));
-  EXPECT_EQ("a/b.cpp/src/b.cpp.qrpj", ProjectPathOf("a/b.cpp"));
-  EXPECT_EQ("a/", ProjectPathOf("a/"));
-}
-
 TEST_F(GraphTest, Order) {
   WriteProject("a", "subproj { \"c\" \"b\" } { }");
   WriteProject("b", "subproj { \"d\" } { }");
