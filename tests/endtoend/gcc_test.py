@@ -1,79 +1,10 @@
 #!/usr/bin/env python3
-"""Builds with the real tools of the gcc family: by the tool itself, and through the make files that it generates."""
+"""Builds with the real tools of the gcc family. Through make files: examples_test.py and init_test.py."""
 
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import PROGRAM_FILES as FILES, SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
-# A program, a dynamic library that it uses, and a static library that both use.
-FILES = {
-    "all.qrex": SETTINGS,
-    "tree/.qrwsroot": "",
-    "tree/all.qrws": '"all" { "app" }\n',
-    "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -g -Wall -fPIC -MMD }\n',
-    "tree/base/src/base.qrpj": """$TARGET_TYPE = "Static Library"
-$ROOT_TO_PROJDIR = "base"
-@import "common.inc"
-qrex
-{ "numbers.h" "src" { "base.cpp" "numbers.cpp" } }
-""",
-    "tree/base/numbers.h": """@def names =
-{
-    [ one, two, three ]
-}
-enum Number
-{
-    @for (name in names) {name,
-    }
-};
-const char* NameOf(Number number);
-""",
-    "tree/base/src/numbers.cpp": """@import "base/numbers.h"
-const char* NameOf(Number number)
-{
-    @for (name in names) {if (number == name) return @str(name);
-    }
-    return "";
-}
-""",
-    "tree/base/src/base.cpp": "int baseVersion = 1;\n",
-    "tree/shape/src/shape.qrpj": """$TARGET_TYPE = "Dynamic-Link Library"
-$ROOT_TO_PROJDIR = "shape"
-@import "common.inc"
-subproj { "base" }
-+link { -shared -L"out/lib/x64/Debug" }
-qrex
-{ "shape.h" "src" { "shape.cpp" "area.c" } }
-""",
-    "tree/shape/shape.h": 'extern "C" int Area(int a, int b);\nconst char* Corners();\n',
-    "tree/shape/src/shape.cpp": """@import "shape/shape.h"
-@import "base/numbers.h"
-const char* Corners()
-{
-    return NameOf(three);
-}
-""",
-    "tree/shape/src/area.c": "int Area(int a, int b) { return a * b; }\n",
-    "tree/app/src/app.qrpj": """$TARGET_TYPE = "Console Application"
-$ROOT_TO_PROJDIR = "app"
-@import "common.inc"
-subproj { "shape" "base" }
-+link { -L"out/lib/x64/Debug" -Wl,-rpath,out/lib/x64/Debug }
-qrex
-{ "src" { "app.cpp" "parts.cpp" "parts.h" } }
-""",
-    "tree/app/src/parts.h": "int Parts();\n",
-    "tree/app/src/parts.cpp": '@import "parts.h"\nint Parts()\n{\n    return 2;\n}\n',
-    "tree/app/src/app.cpp": """@import "parts.h"
-@import "shape/shape.h"
-@import "base/numbers.h"
-#include <cstdio>
-int main()
-{
-    std::printf("%s %s %d %d\\n", NameOf(two), Corners(), Area(6, 7), Parts());
-}
-""",
-}
 PROGRAM = "out/lib/x64/Debug/app"
-RESULT = "two three 42 2\n"
+RESULT = "a $ debug 1 2\n"
 OBJECTS = "x64/**/*.o"
 LIBRARIES = "out/lib/x64/Debug/*"
 
@@ -81,9 +12,9 @@ LIBRARIES = "out/lib/x64/Debug/*"
 @in_workspace(FILES, "g++")
 def test_builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     output = workspace.run("all.qrex")
-    holds(output, "- base  [", "Linking...", "- shape  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
+    holds(output, "- lib  [", "Linking...", "- dll  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
     equal(sorted(workspace.times(LIBRARIES)),
-          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
+          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libdll.so", "out/lib/x64/Debug/liblib.a"])
     equal(workspace.shell(PROGRAM), RESULT)
     equal(workspace.shell(f"cd / && {workspace.path(PROGRAM)}"), RESULT)  # finds its library from anywhere
 
@@ -91,15 +22,14 @@ def test_builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     lacks(workspace.run("all.qrex"), "Linking...")
     equal(workspace.changed(objects, OBJECTS) + workspace.changed(targets, LIBRARIES), [])
 
-    workspace.append("tree/shape/shape.h", "int More();\n")
+    workspace.append("tree/lib/lib.h", "int More();\n")
     workspace.run("all.qrex")
-    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
-    equal(workspace.changed(targets, LIBRARIES), ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libshape.so"])
+    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/lib/lib.o"])
+    equal(workspace.changed(targets, LIBRARIES), ["out/lib/x64/Debug/app", "out/lib/x64/Debug/liblib.a"])
     equal(workspace.shell(PROGRAM), RESULT)
 
 
-@in_workspace({**FILES, "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -fPIC }\n',  # debug data names the folder
-               "tree/app/src/app.qrpj": FILES["tree/app/src/app.qrpj"].replace(" -Wl,-rpath,out/lib/x64/Debug", "")}, "g++")
+@in_workspace(FILES, "g++")
 def test_a_built_tree_moves_and_two_checkouts_are_equal(workspace):
     workspace.shell("mkdir -p one 'another one/b' && cp -r all.qrex tree one && cp -r all.qrex tree 'another one/b'")
     for folder in ("one", "another one/b"):
@@ -111,18 +41,17 @@ def test_a_built_tree_moves_and_two_checkouts_are_equal(workspace):
 
 @in_workspace(FILES, "g++")
 def test_messages_point_at_the_source(workspace):
-    workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
-    workspace.append("tree/app/src/parts.cpp", "static int unused;\n")
+    workspace.append("tree/lib/lib.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
+    workspace.append("tree/app/src/the kind.cpp", "static int unused;\n")
     output = workspace.run("all.qrex")
-    # Each file that imports the header reports it, at the line of the source. Compiling goes on, nothing is linked.
-    holds(output, "tree/base/numbers.h(13) ...\n", "qrexsource/x64/Debug/base/numbers.h:",
+    # Each file that imports the header reports it, at the line of the source. Compiling goes on, the program is not linked.
+    holds(output, "tree/lib/lib.h(4) ...\n", "qrexsource/x64/Debug/lib/lib.h:",
           ": error: 'nowhere' was not declared in this scope\n", "- app  [",
-          "tree/app/src/parts.cpp(6) ...\n", "warning: 'unused' defined but not used",
-          "\nCompleted with 1 warnings, 3 errors.")
-    equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/parts.o", "x64/Debug/base/base.o",
-                                             "x64/Debug/shape/area.o"])
-    equal(workspace.times(LIBRARIES), {})
-    workspace.replace("tree/base/numbers.h", "nowhere", "0")
+          "tree/app/src/the kind.cpp(3) ...\n", "warning: 'unused' defined but not used",
+          "\nCompleted with 1 warnings, 2 errors.")
+    equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/the kind.o", "x64/Debug/dll/dll.o"])
+    equal(list(workspace.times(LIBRARIES)), ["out/lib/x64/Debug/libdll.so"])
+    workspace.replace("tree/lib/lib.h", "nowhere", "0")
     holds(workspace.run("all.qrex"), "\nCompleted....")
     equal(workspace.shell(PROGRAM), RESULT)
 
@@ -184,16 +113,11 @@ def test_what_switches_name_reaches_the_program(workspace):
 def test_captured_output_that_cannot_be_kept_is_an_error(workspace):
     workspace.write("tools/gcc-4", "#!/bin/sh\nhead -c 3000000 /dev/zero | tr '\\0' x\n")
     output = workspace.shell("ulimit -f 2000; Qrex all.qrex")  # blocks: none of the files of a run is as large
-    holds(output, "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
-          "ERROR getting stdout\n", "x64/Debug/base/compiler.rsp: ", "\nCompleted with 0 warnings, 6 errors.")
+    holds(output, "cmd /c gcc-4 -c @\"x64/Debug/lib/compiler.rsp\" 1>out1.txt 2>&1\n"
+          "ERROR getting stdout\n", "x64/Debug/lib/compiler.rsp: ", "\nCompleted with 0 warnings, 4 errors.")
     workspace.path("tools/gcc-4").unlink()
     workspace.run("all.qrex")
     equal(workspace.shell(PROGRAM), RESULT)
-
-
-# --- Make files. `ar` does not take the switches of the generated rules; a relocatable link serves.
-
-MAKE = "make -f make_all_x64_Debug AR='g++ -r'"
 
 
 run_tests(globals())

@@ -34,6 +34,28 @@ if os.path.isdir(CACHE):
 # The words of `compiler`, in their order.
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 
+# A program, a dynamic and a static library, which print "a $ debug 1 2".
+PROJECT_HEAD = '$TARGET_TYPE = "{}"\n$ROOT_TO_PROJDIR = "{}"\n@import "common.inc"\n'
+PROGRAM_FILES = {
+    "all.qrex": SETTINGS,
+    "tree/all.qrws": '"all" { "lib" "dll" "app" }\n',
+    "tree/common.inc": 'config { "Debug|x64" "Release|x64" }\n+cpp { -std=c++17 -Wall -MMD -fPIC }\n',
+    "tree/app/src/app.qrpj": PROJECT_HEAD.format("Console Application", "app") + 'subproj { "dll" "lib" }\nqrex\n'
+                             '+cpp ("Debug") { -DKIND="a $ debug" }\n+cpp ("Release") { -O2 -DKIND="release" }\n'
+                             '+link { -Wl,-z,now }\n{ "src" { "*.h" "*.cpp" } }\n',
+    "tree/app/src/app.cpp": '@import "lib/lib.h"\n@import "dll/dll.h"\n@import "the kind.h"\n#include <cstdio>\n#define TEXT(x) #x\n'
+                            '#define TEXT_OF(x) TEXT(x)\n'
+                            'int main() { std::printf("%s %d %d\\n", TEXT_OF(KIND), lib(), dll()); }\n',
+    "tree/app/src/the kind.h": "int kind();\n",
+    "tree/app/src/the kind.cpp": '@import "the kind.h"\nint kind() { return 0; }\n',
+    "tree/lib/src/lib.qrpj": PROJECT_HEAD.format("Static Library", "lib") + 'qrex\n{ "*.h" "src" { "*.cpp" } }\n',
+    "tree/lib/lib.h": "int lib();\n",
+    "tree/lib/src/lib.cpp": '@import "lib/lib.h"\nint lib() { return 1; }\n',
+    "tree/dll/src/dll.qrpj": PROJECT_HEAD.format("Dynamic-Link Library", "dll") + 'qrex\n{ "*.h" "src" { "*.cpp" } }\n',
+    "tree/dll/dll.h": "int dll();\n",
+    "tree/dll/src/dll.cpp": '@import "dll/dll.h"\nint dll() { return 2; }\n',
+}
+
 
 class Skipped(Exception):
     """A test needs a tool that is not installed; the text names it."""
