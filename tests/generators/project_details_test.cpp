@@ -33,10 +33,6 @@ TEST_F(ProjectDetailsTest, MissingDependency) {
   EXPECT_EQ(trace, "Writing app.dsp\nWriting new.dsp\n" + missing + "Writing all.dsw\n");
   AssertLacks("all.dsw", "Project Dependency");
 
-  LoadAndGenerate(CompilerKind::vc8);
-  EXPECT_EQ(trace, noLibrary + noLibrary + "Writing app.vcproj\nWriting new.vcproj\n" + missing + "Writing all.sln\n");
-  AssertHolds("all.sln", "\tProjectSection(ProjectDependencies) = postProject\n\tEndProjectSection\nEndProject\n");
-
   LoadAndGenerate(CompilerKind::vc10);
   EXPECT_EQ(trace, noLibrary + noLibrary + missing +
                        "Writing app.vcxproj\nWriting app.vcxproj.filters\nWriting new.vcxproj\n"

@@ -133,6 +133,8 @@ TEST_F(MessagesTest, Lists) {
       {"@for (a in [1])", "t(1) : Expected { when read EOS\n    for @for directive"},
       {"@for (a in\n 1) {}", "t(2) : [ expected when read read 1"},
       {"@for (a in [1) {}", "t(1) : Met EOS while reading argument 1\n    in @for directive for list [1"},
+      {"@for ((a,b) in\n[(1,2,3)]) {}", "t(2) : ) expected when read ,"},
+      {"@for (a in [`b`c]) {}", "t(1) : , or ] expected when read c"},
       {"@for (a in [1,2]) {@fail(\"no\")}", "t(1) : no\n    in @for directive when a = 1"},
       {"@for ((a,b) in [(1,2)]) {\n@fail(\"no\")}", "t(2) : no\n    in @for directive when  = (1,2)"},
       {"@for (a in [@quote(@fail(\"no\"))]) {a}",

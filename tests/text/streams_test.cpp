@@ -9,28 +9,6 @@
 
 namespace qrex {
 
-TEST(StreamsTest, PagedBuffer) {
-  PagedBuffer buffer(4);
-  const auto text = [&] {
-    std::string all;
-    buffer.AppendTo(all);
-    return std::to_string(buffer.PageCount()) + all;
-  };
-  buffer.Write("abcd", 4);
-  const char* first = buffer.Page(0);
-  EXPECT_EQ("1abcd", text());
-  buffer.Write("efghijk", 7);
-  EXPECT_EQ("3abcdefghijk", text());
-  EXPECT_EQ(first, buffer.Page(0));
-  buffer.SetSize(5, false);
-  buffer.Write("!", 1);
-  EXPECT_EQ("3abcde!", text());
-  buffer.SetSize(4, true);
-  EXPECT_EQ("1abcd", text());
-  buffer.Clear();
-  EXPECT_EQ("0", text());
-}
-
 TEST(StreamsTest, Readers) {
   PagedBuffer buffer(4);
   PagedBufferToOutputStreamAdapter(buffer).Write("abcdefghij", 10);

@@ -100,13 +100,6 @@ TEST_F(LoopTest, WordsOfCppInDeclarations) {
             Translate("d.h", "[[nodiscard]] constexpr $function+ int32 f() { return 1; }").find(passes));
 }
 
-TEST_F(LoopTest, DollarNew) {
-  EXPECT_EQ("p = vesk::DollarNew(new a::b<c>(d));\nq = vesk::DollarNew(new  T );{}",
-            Translate("t.cpp", "p = $new a::b<c>(d);\nq = $new  T ;{}"));
-  EXPECT_EQ("vesk::DollarNew(new V<W<int>>(f(1), \")\")(2)), vesk::DollarNew(new X);",
-            Translate("u.cpp", "$new V<W<int>>(f(1), \")\")(2), $new X;"));
-}
-
 TEST_F(LoopTest, InitAndUninit) {
   const std::string text = Translate("app.cpp", "$init { a(); }\nnamespace n { $init {}\n}\n$uninit { b(); }\n");
   EXPECT_EQ(

@@ -5,32 +5,6 @@ namespace {
 
 using MixinsTest = TranslateTest;
 
-constexpr char kListOfEverySort[] = R"($mixin M << reflect >> { $int32 a; };
-$model Pos { bool y; };
-namespace n { $mixin T { }; }
-$class+ K : mixin [ M { $bool b; int plain; } Pos ? other::U <int, 3> n::T<char> model { int8 z; } ]
-{
-};
-)";
-
-// What a mixin reflects stands in the record of the class; the model of an entry is reached through its _model_.
-TEST_F(MixinsTest, RecordOfAClassWithMixins) {
-  const std::string tail = TranslateHeader(kListOfEverySort).tail;
-  EXPECT_EQ(Section(tail, "K_fields[] =\n", "        };"), "        {\n            { \"a\", offsetof(K,a), K_a },\n");
-  EXPECT_EQ(Section(tail, "K_modelFields[] =\n", "        };"),
-            "        {\n            { \"y\", offsetof(K,_model_.y), K_y, 0, -1 },\n"
-            "            { \"z\", offsetof(K,_model_.z), K_z, 0, -1 },\n");
-
-  settings.compilableText = true;  // the model in the body of a mixin has no member to stand in
-  const std::pair<std::string, std::string> models[] = {{"$mixin M { $model { int8 a; } };", "a"},
-                                                        {"$mixin M : model { int8 a; } { };", "_model_.a"},
-                                                        {"$model M { int8 a; };", "_model_.a"}};
-  for (const auto& [text, place] : models) {
-    const std::string record = TranslateHeader(text + " $struct+ K : mixin [ M ] { };").tail;
-    EXPECT_NE(record.find("{ \"a\", offsetof(K," + place + "), K_a, 0, -1 },\n"), record.npos) << text;
-  }
-}
-
 TEST_F(MixinsTest, Implementing) {
   const std::string declared =
       "$interface+ I : vesk::IObject { int32 f(int32 a=1) const; void g(); };\n$adt A { void h(string8 s); };\n";

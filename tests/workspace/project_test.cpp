@@ -313,6 +313,8 @@ TEST_F(ProjectTest, Messages) {
            {"general (\"a\" \"b\") { }", "(3) : Expected comma or right parenthesis when read \"b\""},
            {"general () { }", "(3) : Expected quoted string when read )"},
            {"+ \"cpp\"", "(3) : Expected identifier when read \"cpp\""},
+           {"+asm { }", "(3) : Expected 'cpp' or 'link' when read asm"},
+           {"-asm { }", "(3) : Expected { when read -"},
            {"-cpp {\n/frob\n}", "(4) : Invalid switch /frob"},
            {"+link { -a", "(3) : Unexpected end of file"},
            {"directories \"plain\"", "(3) : Expected '[', '+' or '-' when read \"plain\""},
