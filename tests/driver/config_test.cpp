@@ -130,7 +130,6 @@ TEST_F(ConfigTest, Messages) {
            {"compiler =", "(1) : Invalid option : EOS"},
            {"runtime = \"built\"", "(1) : Invalid option : \"built\""},
            {"\n\nmoed = clean", "(3) : Syntax error: moed"},
-           {"translateOnly = yes", "(1) : Expected false/true after = when read yes"},
            {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},
            {"jobs = -1", "(1) : Expected number after = when read -"},
            {"INCLUDE(\"a\") += \"b\"", "(1) : Expected { after += when read \"b\""},

@@ -52,10 +52,8 @@ TEST_F(MessagesTest, Values) {
       {"@let int 1", "t(1) : Identifier expected for macro name when read 1"},
       {"@let int x = 1\n@let bool x = true", "t(2) : Redefinition of variable x in this scope"},
       {"@let int x 1", "t(1) : = expected in definition of macro x when read 1"},
-      {"@let int x : 1", "t(1) : = expected in definition of macro x when read 1"},
       {"@let int x := 1", "t(1) : @let directive failed: x := may only be used for string type"},
       {"@let int x = 1 2", "Read 2 in middle of expression"},
-      {"@let int x =", "t(1) : Expected { when read EOS"},
       {"@let int x = 3000000000", "No implicit conversion from value 3000000000 to int32"},
       {"@let char c = \"ab\"", "No implicit conversion from value ab to char"},
       {"@let int x = 1\n@let x = \"s\"",
@@ -72,10 +70,8 @@ TEST_F(MessagesTest, Definitions) {
       {"@def m(1)", "t(1) : Read 1 while trying to read argument for definition of macro m"},
       {"@def m(x, x) = 1", "t(1) : Repeated argument x in definition of macro m"},
       {"@def m(true) = 1", "t(1) : Invalid formal argument 'true' in definition of macro m"},
-      {"@def m(f(x)) = 1", "t(1) : Expected ) when read x"},
       {"@def m(x y) = 1",
        "t(1) : Comma or right parenthesis expected when read y\nwhile reading argument list for definition of macro m"},
-      {"@def m =\n{\nx", "t(3) : Met EOS before closing }"},
       {"\n@exportdef m = 1", "t(2) : No parent frame"},
   });
   LSFrame frame(world);
@@ -89,7 +85,6 @@ TEST_F(MessagesTest, Calls) {
       {"@def m(x,y) = x\nm 1", "t(2) : ( expected to begin argument list for macro m(x,y) when read 1"},
       {"@def m(x,y) = x\nm(a)", "t(2) : Insufficient arguments provided for macro m(x,y)"},
       {"@def m(x,y) = x\nm(a,b,\nc)", "t(2) : Too many arguments provided for macro m(x,y)"},
-      {"@def m(x) = x\nm(`a", "t(2) : Met EOS while reading argument `a"},
       {"@def m(int x) = x\nm(\"s\")", "No conversion from string to int64\n    passing formal argument x to macro m"},
       {"@def m =\n{\n\n@fail(\"bad\")\n}\nm", "t(4) : bad\n    invoking macro m"},
       {"@def m(x, y) = @fail(\"bad\")\n@def n(z) = { m(1, z) }\n\nn([2,3])",
@@ -105,14 +100,11 @@ TEST_F(MessagesTest, Calls) {
 TEST_F(MessagesTest, Conditions) {
   AssertFail({
       {"@if 1", "t(1) : ( expected when read 1"},
-      {"@if (true)", "t(1) : Expected { when read EOS"},
       {"@if (\n1)\n{}", "t(1) : No implicit conversion from int64 to bool\n    in @if(1)"},
       {"@if (true) {}\n@elseif (1) {}", "t(1) : No implicit conversion from int64 to bool\n    in @elseif(1)"},
-      {"@if (true 1) {}", "t(1) : Expected ) after true when read 1 in expression\n    in @if(true 1)"},
       {"@if () {}", "t(1) : Unexpected ) after ( in expression\n    in @if()"},
       {"@def a = b\n@if (1 +\n a) {}", "t(2) : Unexpected b after + in expression\n    in @if(1 +\n b)"},
       {"@if (\n@fail(\"x\")) {}", "t(2) : x\n    in @if(@fail(\"x\"))"},
-      {"@while 1", "t(1) : ( expected when read 1"},
       {"@while (1) {}", "t(1) : No implicit conversion from int64 to bool\n    in @while(1)"},
       {"@def a = 1\n\n@assert(a == 2)", "t(3) : Assertion failure\n        @assert(a == 2)\nie      @assert(1 == 2)"},
       {"@assert(1)", "t(1) : No implicit conversion from int64 to bool\n    in @assert(1)"},
@@ -130,7 +122,6 @@ TEST_F(MessagesTest, Lists) {
       {"@for ((1", "t(1) : Identifier expected when read 1"},
       {"@for ((a 1", "t(1) : , or ) expected when read 1"},
       {"@for (a of", "t(1) : 'in' expected when read of"},
-      {"@for (a in [1])", "t(1) : Expected { when read EOS\n    for @for directive"},
       {"@for (a in\n 1) {}", "t(2) : [ expected when read read 1"},
       {"@for (a in [1) {}", "t(1) : Met EOS while reading argument 1\n    in @for directive for list [1"},
       {"@for ((a,b) in\n[(1,2,3)]) {}", "t(2) : ) expected when read ,"},
@@ -148,13 +139,10 @@ TEST_F(MessagesTest, Expressions) {
       {"\n@print(@(\"\\xff\"))", "t(2) : String conversion failed"},
       {"\n@(1 2)", "t(2) : Expected ) after 1when read 2 in expression\n    in @(1 2)"},
       {"@(1 / 0)", "t(1) : Division by zero error\n    in @(1 / 0)"},
-      {"@(true ? 2)", "t(1) : Expected : after 2 when read )\n    in @(true ? 2)"},
       {"@def n = m@@1\n@def m1(x) = x\n@[n]",
        "t(3) : ( expected to begin argument list for macro m1(x) when read ]\n    in @[m1]"},
-      {"@str x", "t(1) : Expected ( when read x"},
       {"@unstr(x)", "t(1) : x isn't a quoted string\n    in @unstr(x)"},
       {"@unstr \"a\"", "t(1) : ( expected when read \"a\""},
-      {"@quote", "t(1) : Expected ( when read EOS"},
   });
 }
 

@@ -101,9 +101,6 @@ TEST_F(ClassesTest, Errors) {
       {"$adt A { }; $adt implement A;", 1, "Forward declaration of $adt A incompatible with 'implements'"},
       {"$adt A { }; $adt implement A <<os>>;", 1, "Forward declaration of $adt A incompatible with 'implements'"},
       {"$adt A { }; $adt A { };", 1, "Repeated definition of $adt A"},
-      {"$adt A { } $", 1, "; expected after definition of $adt A when read $"},
-      {"$adt A : { };", 1, "Expected [ after : when read {"},
-      {"$adt A int32", 1, "Expected { after A when read int32"},
       {"$struct A <<os>>; $struct A <<os>>;", 1, "$struct A already deferred"},
       // qualifiers
       {"$struct A <<\nos bogus>> { };", 2, "Unrecognised qualifier << bogus >> on $struct A"},
@@ -123,6 +120,7 @@ TEST_F(ClassesTest, Errors) {
       // the body
       {"$struct A { $int32 x; $int32 x; };", 1, "Redefinition of field x"},
       {"$struct A { $void f([E] e); };", 1, "'[' unexpected.  Polymorphic argument not allowed here"},
+      {"$struct A { $int32 x, y; };", 1, "; expected after field declaration when read ,"},
       {"$struct+ A { $int x; };", 1, "Can't accept platform dependent type: int"},
       {"$struct A { $model { int32 x; } $model { } };", 1, "Repeated model declaration"},
       {"$struct A { $model { int32 x; } $int32 x; };", 1, "Redefinition of field x"},

@@ -123,9 +123,6 @@ TEST_F(LoopTest, ErrorsOfDirectives) {
       {"int a;\n$", 2, "'$EOS' is not a valid directive"},
       {"$enum e { x };\nnamespace e { }", 2, "Can't open namespace e : $enum e is not a namespace"},
       {"$new 1;", 1, "Expected identifier after new when read 1"},
-      {"$new a::\n;", 2, "Expected identifier after :: when read ;"},
-      {"$new a<", 1, "Reached end of stream while scanning for matching >"},
-      {"$new a(", 1, "Reached end of stream while scanning for matching )"},
       {"$makefunctor nothing f { }", 1, "Unrecognised identifier : nothing"},
   });
 }

@@ -39,7 +39,6 @@ TEST_F(LookUp, CurrentNameSpaceThenRoot) {
       {names + "$struct K isa R { };", 2, "$interface identifier expected when read $struct R"},
       {names + "$struct K isa a::A::x { };", 2, ":: not expected here : $struct a::A is not a namespace"},
       {names + "$struct K isa a::none { };", 2, "Unrecognised identifier : none"},
-      {names + "$struct K isa ::a::\n{ };", 3, "Expected identifier after :: when read {"},
   });
 }
 
@@ -84,7 +83,6 @@ TEST_F(LookUp, FormsThatAreErrors) {
   AssertErrors(always);
   AssertErrors({{"namespace a::b { }", 1, "Expected { after a when read ::"},
                 {"namespace fs = std::filesystem;", 1, "Expected { after fs when read ="},
-                {"namespace a EXPORT { }", 1, "Expected { after a when read EXPORT"},
                 {"namespace [[x]] a { }", 1, "Expected identifier after namespace when read ["},
                 {"\n#define OPEN namespace x::y {", 2, "Expected { after x when read ::"}});
   EXPECT_EQ("", Fault("#define OPEN namespace x {\n$struct S { }; $type+ x::S; }"));
@@ -283,9 +281,7 @@ TEST_F(NameSpaceTest, ErrorsOfWarningDirectives) {
   AssertErrors({
       {"$warning push;", 1, "Expected ( after warning when read push"},
       {"$warning(\nsuppress: 1000)", 2, "Expected push/pop/enable/disable after ( when read suppress"},
-      {"$warning(push pop)", 1, "Expected ; or ) after push when read pop"},
       {"$warning(pop)", 1, "$warning pop without matching push"},
-      {"$warning(disable 1000)", 1, "Expected : after disable when read 1000"},
       {"$warning(disable: 999)", 1, "Invalid warning code : 999"},
       {"$warning(enable: 1002 1018)", 1, "Invalid warning code : 1018"},
   });

@@ -31,10 +31,10 @@ TEST_F(VariantsTest, Errors) {
       {"$variant V <<\ndc>> { };", 2, "Unrecognised qualifier << dc >> on $variant V"},
       {"$variant V\nint32;", 2, "Expected { after V when read int32"},
       {"$variant V { default 1", 1, "Met EOS before read ';'"},
-      {"$variant V {", 1, "Met EOS before read matching brace for $variant block"},
-      {"$variant V { { int32 a;", 1, "Met EOS before read matching brace for struct within $variant block"},
       {"$variant V { void;\nvoid; };", 2, "Variant V : anonymous type 'void' incompatible with a default value"},
       {"$variant V { default 1;\nvoid; };", 2, "Variant V : anonymous type 'void' incompatible with a default value"},
+      {"$variant V { { int32 a } s; };", 1, "; expected after type definition when read }"},
+      {"$variant V { int32 a }", 1, "; expected after type definition when read }"},
       {"$variant V {\n};", 2, "$variant V is empty"},
   });
 }

@@ -282,13 +282,10 @@ TEST_F(ProjectTest, OptionsOfFiles) {
 TEST_F(ProjectTest, Messages) {
   for (const auto& [text, message] : std::initializer_list<std::pair<std::string, std::string>>{
            {"", "(1) : Expected '$' when read EOS"},
-           {"$TARGET", "(1) : Expected 'TARGET_TYPE' when read TARGET"},
            {"$TARGET_TYPE \"x\"", "(1) : Expected = after TARGET_TYPE when read \"x\""},
-           {"$TARGET_TYPE = 'x'", "(1) : Expected quoted string when read 'x'"},
            {"$TARGET_TYPE = \"x\"\n$",
             "(1) : Only target types \"Application\",\"Static Library\",\"Console Application\",\"Dynamic-Link "
             "Library\",\"Utility Project\" supported"},
-           {"$TARGET_TYPE = \"Library\"\nqrex", "(2) : Expected '$' when read qrex"},
            {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a\\\\b\"",
             "(2) : Forward slashes must be used in \"a\\\\b\""},
            {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a/\"\n",
@@ -305,13 +302,11 @@ TEST_F(ProjectTest, Messages) {
            {"subproj { \"a\\\\b\" }", "(3) : Forward slashes must be used in \"a\\\\b\""},
            {"{\n\"a\xFF\" }", "(4) : Path is not valid UTF-8 : \"a\xFF\""},
            {"toolfiles {\n\"a\\\\b\" }", "(4) : Forward slashes must be used in \"a\\\\b\""},
-           {"prelinkevent { \"a\" }", "(3) : Expected quoted string when read }"},
            {"prelinkevent { \"a\" \"b\" \"c\" }", "(3) : Expected } after \"b\" when read \"c\""},
            {"general { Key = \"a\" }", "(3) : Invalid key Key"},
            {"general { PlatformToolset = \"v143\" }", "(3) : Invalid key PlatformToolset"},
            {"general { \"Key\" }", "(3) : Expected identifier when read \"Key\""},
            {"general (\"a\" \"b\") { }", "(3) : Expected comma or right parenthesis when read \"b\""},
-           {"general () { }", "(3) : Expected quoted string when read )"},
            {"+ \"cpp\"", "(3) : Expected identifier when read \"cpp\""},
            {"+asm { }", "(3) : Expected 'cpp' or 'link' when read asm"},
            {"-asm { }", "(3) : Expected { when read -"},

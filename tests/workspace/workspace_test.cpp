@@ -54,9 +54,6 @@ TEST_F(WorkspaceFileTest, Messages) {
   Write("tree/macro.qrws", "\n@else");
   for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
            {"all", "(1) : Expected double quoted string when read all"},
-           {"'all' { }", "(1) : Expected double quoted string when read 'all'"},
-           {"\"all\"\n(", "(2) : Expected { when read ("},
-           {"\"all\" {\napp }", "(2) : Expected double quoted string when read app"},
            {"\"all\" {\n\"a\\\\b\" }", "(2) : Forward slashes must be used in \"a\\\\b\""},
            {"\"all\" {\n\"none.qrws\"\n}", "(2) : Couldn't open workspace file none.qrws"},
        }) {
