@@ -73,11 +73,4 @@ def test_all_errors_are_told(workspace):
         equal(told(fresh.run("all.qrex", "keepGoing=true")), told(log))
 
 
-@in_workspace(files())
-def test_without_the_key_the_first_error_ends_the_run(workspace):
-    log = workspace.run("all.qrex", status=1)
-    holds(log, "bad.h(2)")
-    lacks(log, "not translated")
-
-
 run_tests(globals())
