@@ -5,7 +5,6 @@ import os
 import re
 import shutil
 import subprocess
-import time
 from pathlib import Path
 
 from workspace_fixture import ROOT, Workspace, equal, holds, lacks, need, run_tests
@@ -44,8 +43,7 @@ class Build(Workspace):
         return done.stdout
 
     def edit(self, name, old, new):
-        time.sleep(0.01)  # a tick of the clock of stamps
-        self.replace(f"stock/{name}", old, new)
+        super().edit(f"stock/{name}", old, new)
 
 
 def of_example(*tools, prefix="usr local"):

@@ -7,7 +7,7 @@ import signal
 import subprocess
 import time
 
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
 
 # Takes the longer the earlier its source comes, so that ends come in another order; notes how many run at once.
 COMPILER = r"""#!/bin/bash
@@ -39,8 +39,7 @@ def files(faulty):
 
 def told(text):
     """A log without what has to differ."""
-    text = re.sub(r"\.{3,} *[\d.]+ ms|argv\[\d\] = jobs=.*\n|process \d+", "", text)
-    return re.sub(r"[\w/]*(compiler|\.o)\.rsp", "RSP", text)
+    return re.sub(r"[\w/]*(compiler|\.o)\.rsp", "RSP", comparable(text))
 
 
 def left(workspace):

@@ -32,12 +32,8 @@ def files(switches="'-DNAME=\"two words\"'"):
     return made
 
 
-def clean(workspace):
-    workspace.shell("rm -rf x64 out qrexsource")
-
-
 def build(workspace, launcher, *arguments, **environment):
-    clean(workspace)
+    workspace.clean()
     log = workspace.run("all.qrex", f"launcher = {launcher}", "jobs=4", *arguments, "failOnErrors=true", **environment)
     equal(workspace.shell("./out/lib/x64/Debug/app"), "two words\n")
     return log
@@ -103,7 +99,7 @@ def test_distcc(workspace):
         equal(remote(), COUNT)
         # A source that does not compile there is an error as any, and counted once.
         workspace.append("tree/app/src/part1.cpp", "int part1() { return nothing; }\n")
-        clean(workspace)
+        workspace.clean()
         log_of_error = workspace.run("all.qrex", 'launcher="distcc"', "jobs=4", **farm)
         holds(log_of_error, "tree/app/src/part1.cpp(2) ...", "0 warnings, ")
         workspace.write("tree/app/src/part1.cpp", files()["tree/app/src/part1.cpp"])
@@ -139,13 +135,13 @@ def test_the_missing_one_is_named(workspace):
     workspace.write("tools/pass", '#!/bin/sh\nexec "$@"\n')
     for launcher, path, message in (("absent", "/usr/bin", "ERROR: absent was not found on PATH\n"),
                                     ("pass", "/nowhere", "ERROR: gcc-4 was not found on PATH, which pass is to run\n")):
-        clean(workspace)
+        workspace.clean()
         log = workspace.run("all.qrex", f'launcher = {{ "{launcher}" }}', f'PATH("x64") = {{ "tools" "{path}" }}')
         equal(log.count(message), COUNT)
         holds(log, f"0 warnings, {COUNT} errors")
     # One that dies leaves nothing that passes for an object.
     workspace.write("tools/pass", '#!/bin/sh\nwhile [ "$1" != -o ]; do shift; done\necho half > "$2"\nkill -9 $$\n')
-    clean(workspace)
+    workspace.clean()
     holds(workspace.run("all.qrex", 'launcher = "pass"', "commandFiles=false"), "ERROR: pass was ended by signal 9", f"{COUNT} errors")
     equal(workspace.times("x64/**/*.o"), {})
     # The linker has none.

@@ -4,7 +4,6 @@
 import json
 import os
 import shutil
-import time
 
 from workspace_fixture import PROGRAM_FILES as FILES, SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
 
@@ -18,11 +17,6 @@ def steps(text):
 def settle(workspace, targets=""):
     workspace.shell(f"ninja {targets}")
     equal(workspace.shell(f"ninja {targets}"), NOTHING)
-
-
-def edit(workspace, name, old, new):
-    time.sleep(0.01)  # a tick of the clock of stamps
-    workspace.replace(name, old, new)
 
 
 @in_workspace(FILES, "ninja", "g++")
@@ -46,7 +40,7 @@ def test_builds_what_a_run_builds(workspace):
         before = {folder: {key: path.stat().st_mtime_ns for key, path in outputs(folder).items()}
                   for folder in (workspace.folder, ninja)}
         for folder in ("", "ninja/"):
-            edit(workspace, f"{folder}tree/{name}", old, new)
+            workspace.edit(f"{folder}tree/{name}", old, new)
         workspace.run("all.qrex")
         workspace.shell("cd ninja && ninja")
         made = {folder: sorted(key for key, path in outputs(folder).items() if before[folder][key] != path.stat().st_mtime_ns)
@@ -87,12 +81,12 @@ def test_follows_changes(workspace):
     workspace.run(*GEN)
     settle(workspace)
     written = workspace.path("build.ninja").read_bytes()
-    edit(workspace, "tree/app/src/app.qrpj", '-DKIND="a $ debug"', '-DKIND="other"')
+    workspace.edit("tree/app/src/app.qrpj", '-DKIND="a $ debug"', '-DKIND="other"')
     text = workspace.shell("ninja")
     equal([step for step in steps(text) if "Compiling" in step],
           ["Compiling 'qrexsource/x64/Debug/app/src/the kind.cpp'", "Compiling qrexsource/x64/Debug/app/src/app.cpp"])
     equal(workspace.shell("ninja && out/lib/x64/Debug/app"), NOTHING + "other 1 2\n")
-    edit(workspace, "tree/app/src/app.qrpj", '-DKIND="other"', '-DKIND="a $ debug"')
+    workspace.edit("tree/app/src/app.qrpj", '-DKIND="other"', '-DKIND="a $ debug"')
     settle(workspace)
     equal(workspace.path("build.ninja").read_bytes(), written)
     workspace.write("tree/lib/src/new.cpp", "int fresh() { return 3; }\n")
@@ -106,7 +100,7 @@ def test_follows_changes(workspace):
     holds(workspace.shell("ninja"), "Looking at translations of Debug|x64")
     assert workspace.path("qrexsource/x64/Debug/lib/lib.h").exists()
     settle(workspace)
-    edit(workspace, "all.qrex", "compiler = gcc", "modernCpp = true compiler = gcc")
+    workspace.edit("all.qrex", "compiler = gcc", "modernCpp = true compiler = gcc")
     holds(workspace.shell("ninja"), "Writing build.ninja", "Translating Debug|x64")
     settle(workspace)
 
@@ -114,18 +108,18 @@ def test_follows_changes(workspace):
 @in_workspace(FILES, "ninja", "g++")
 def test_stops_at_errors(workspace):
     workspace.run(*GEN)
-    edit(workspace, "tree/lib/src/lib.cpp", "return 1", "return one")
+    workspace.edit("tree/lib/src/lib.cpp", "return 1", "return one")
     text = workspace.shell("ninja -k 0", status=1, LC_ALL="C")
     holds(text, "FAILED: x64/Debug/lib/lib.o")
     holds(text, "'one' was not declared")
     holds(text, "ninja: build stopped")
     assert workspace.path("out/lib/x64/Debug/libdll.so").exists() and not workspace.path("out/lib/x64/Debug/app").exists()
-    edit(workspace, "tree/lib/src/lib.cpp", "return one", "return 1")
-    edit(workspace, "tree/lib/lib.h", "int lib();", "$class { };")
+    workspace.edit("tree/lib/src/lib.cpp", "return one", "return 1")
+    workspace.edit("tree/lib/lib.h", "int lib();", "$class { };")
     text = workspace.shell("ninja", status=1)
     holds(text, "FAILED: qrexsource/x64/Debug/.translated \n", "tree/lib/lib.h(1) : error : ", "ninja: build stopped")
     equal(workspace.shell("ninja", status=1).count("FAILED"), 1)
-    edit(workspace, "tree/lib/lib.h", "$class { };", "int lib();")
+    workspace.edit("tree/lib/lib.h", "$class { };", "int lib();")
     workspace.replace("tree/common.inc", "config", "confug")
     holds(workspace.shell("ninja", status=1), "FAILED: build.ninja", "tree/lib/src/lib.qrpj(3) : ")
     workspace.replace("tree/common.inc", "confug", "config")

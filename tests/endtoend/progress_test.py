@@ -5,7 +5,7 @@ import re
 import signal
 
 import terminal_fixture
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
 
 # Prints a warning, an error and a note, each with the lines that compilers add, where the source asks for it.
 COMPILER = r"""#!/bin/bash
@@ -53,23 +53,15 @@ def shown(output):
     return "\n".join(lines)
 
 
-def comparable(text):
-    return re.sub(r"\.{3,} *[\d.]+ ms|    hint: .*\n|argv\[\d\] = .*\n", "", text)
-
-
 def statuses(output):
     return [match.group() for match in STATUS.finditer(output)]
-
-
-def fresh(workspace):
-    workspace.shell("rm -rf x64 out qrexsource")
 
 
 @in_workspace(FILES)
 def test_line_is_shown_and_gone(workspace):
     piped = workspace.run("all.qrex", "jobs=2")
     lacks(piped, "\x1b")
-    fresh(workspace)
+    workspace.clean()
     output, status = on_terminal(workspace, "jobs=2")
     equal(status, 0)
     equal(comparable(shown(output)), comparable(piped))  # what the linker printed stands whole in it, too
@@ -86,10 +78,10 @@ def test_terminals_that_take_less(workspace):
     workspace.write("tools/g++", LINKER.replace("sleep 2.4; ", ""))
     piped = comparable(workspace.run("all.qrex"))
     for kind in ("dumb", "", None):
-        fresh(workspace)
+        workspace.clean()
         equal(comparable(on_terminal(workspace, TERM=kind)[0]), piped)
     for columns in (4, 16, 34):
-        fresh(workspace)
+        workspace.clean()
         output = on_terminal(workspace, columns=columns)[0]
         drawn = re.findall(r"(\[\d[^\r\n\x1b]*)(?=\r\x1b\[K)", output)
         assert all(len(line) < columns for line in drawn) and bool(drawn) == (columns > 5), output
@@ -101,7 +93,7 @@ def test_messages_of_tools_are_coloured(workspace):
     piped = workspace.run("all.qrex")
     holds(piped, "1 warnings, 1 errors")
     for environment, is_coloured in (({}, True), ({"NO_COLOR": ""}, True), ({"NO_COLOR": "1"}, False)):
-        fresh(workspace)
+        workspace.clean()
         output = on_terminal(workspace, **environment)[0]
         assert statuses(output)
         if is_coloured:
@@ -115,7 +107,7 @@ def test_messages_of_tools_are_coloured(workspace):
 @in_workspace(FILES)
 def test_signals_leave_no_line(workspace):
     for number, status in ((signal.SIGTERM, -signal.SIGTERM), (signal.SIGHUP, -signal.SIGHUP)):
-        fresh(workspace)
+        workspace.clean()
         output, ended = on_terminal(workspace, "jobs=2", until=b"slow.cpp", kill=number)
         equal(ended, status)
         assert shown(output).endswith("\n"), shown(output)

@@ -10,7 +10,7 @@ import time
 from pathlib import Path
 
 from browser_fixture import Browser, with_selenium
-from workspace_fixture import ROOT, SETTINGS, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import ROOT, SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
 
 with_selenium()
 
@@ -72,9 +72,9 @@ def compiled(workspace):
 @in_workspace(FILES)
 def test_trace_tells_what_ran_when_and_why(workspace):
     piped = workspace.run("all.qrex")
-    workspace.shell("rm -rf x64 out qrexsource")
+    workspace.clean()
     log = workspace.run("all.qrex", TRACE)
-    equal(*(re.sub(r"\.{3,} *[\d.]+ ms|argv.*\n", "", text) for text in (log, piped)))
+    equal(comparable(log), comparable(piped))
     found = spans(workspace)
     one, two = (found[f"core/src/{name}.cpp", "compiler"] for name in ("one", "two"))
     assert 300 <= one[1] - one[0] < 600 and two[0] < one[1] and {one[2], two[2]} == {"slot 1", "slot 2"}, found
@@ -323,7 +323,6 @@ def test_page_of_files_with_errors(workspace):
     """In a build, what the page collects is not told twice; files behind the error are in it as well."""
     workspace.write("tree/app/b.h", '@import "app/a.h"\n@fail("no <b>")\n')
     workspace.write("tree/app/src/m0.cpp", '@import "Vesk/vxObject/IObject.h"\n$struct Behind { $int32 x; };\n')
-    comparable = lambda text: re.sub(r"\.{3,} *[\d.]+ ms|argv.*\n", "", text)
     plain = workspace.run("all.qrex", status=1)
     workspace.shell("rm -rf qrexsource out")
     equal(comparable(workspace.run("all.qrex", REPORT, status=1)), comparable(plain))

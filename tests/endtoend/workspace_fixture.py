@@ -2,11 +2,13 @@
 
 import functools
 import os
+import re
 import shutil
 import stat
 import subprocess
 import sys
 import tempfile
+import time
 import traceback
 from pathlib import Path
 
@@ -93,6 +95,15 @@ class Workspace:
         assert old in text, f"{old!r} does not stand in {name}"
         self.path(name).write_text(text.replace(old, new))
 
+    def edit(self, name, old, new):
+        """Replaces a text, later than all that was written before."""
+        time.sleep(0.02)
+        self.replace(name, old, new)
+
+    def clean(self):
+        """Removes all that builds have made."""
+        self.shell("rm -rf x64 out qrexsource")
+
     def run(self, *arguments, status=0, **environment):
         """Runs the tool; its standard output. Fails on another exit status."""
         done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900,
@@ -116,6 +127,11 @@ class Workspace:
     def changed(self, before, pattern):
         """The files of the pattern that are new or younger than in `before`."""
         return sorted(name for name, time in self.times(pattern).items() if before.get(name) != time)
+
+
+def comparable(log):
+    """A log without what differs from run to run."""
+    return re.sub(r"\.{3,} *[\d.]+ ms|    hint: .*\n|argv\[\d+\] = .*\n", "", log)
 
 
 def equal(got, expected):
