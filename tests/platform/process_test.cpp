@@ -175,10 +175,8 @@ TEST_F(ProcessTest, Commands) {
 
 // A line that needs no shell is run without one; 2>&1 needs it.
 TEST_F(ProcessTest, TheSameWithAShellAndWithout) {
-  Write("bin/show", "#!/bin/sh\nfor word; do printf '<%s>' \"$word\"; done\nexit 5\n");
-  std::filesystem::permissions("bin/show", std::filesystem::perms::owner_all);
+  WriteProgram("bin/show", "for word; do printf '<%s>' \"$word\"; done\nexit 5\n");
   std::filesystem::create_directory("bin/folder");
-  const std::string path = std::getenv("PATH");
   SetEnvironment("PATH", "bin:/bin:/usr/bin");
   int plainCount = 0;
   for (const std::string line :
@@ -191,13 +189,10 @@ TEST_F(ProcessTest, TheSameWithAShellAndWithout) {
     plainCount += WordsWithoutInterpreter(line).empty() ? 0 : 1;
   }
   EXPECT_EQ(6, plainCount);
-  SetEnvironment("PATH", path);
 }
 
 TEST_F(ProcessTest, CompilerOfTheGccFamily) {
-  Write("bin/gcc", "#!/bin/sh\nexit 7\n");
-  std::filesystem::permissions("bin/gcc", std::filesystem::perms::owner_all);
-  const std::string path = std::getenv("PATH");
+  WriteProgram("bin/gcc", "exit 7\n");
   SetEnvironment("PATH", "bin:/bin:/usr/bin");
   EXPECT_EQ(7, Code("cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
   std::filesystem::rename("bin/gcc", "bin/gcc-4");
@@ -205,7 +200,6 @@ TEST_F(ProcessTest, CompilerOfTheGccFamily) {
   EXPECT_EQ(FindProgram("bin/gcc-4"), FindProgram("gcc-4"));
   EXPECT_EQ(std::filesystem::current_path() / "bin/gcc-4", FindProgram("gcc-4"));
   EXPECT_EQ("", FindProgram("gcc-5") + FindProgram("none/gcc-4"));
-  SetEnvironment("PATH", path);
 }
 
 TEST_F(ProcessTest, BatchFile) {
