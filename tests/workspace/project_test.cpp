@@ -282,6 +282,8 @@ TEST_F(ProjectTest, OptionsOfFiles) {
 TEST_F(ProjectTest, Messages) {
   for (const auto& [text, message] : std::initializer_list<std::pair<std::string, std::string>>{
            {"", "(1) : Expected '$' when read EOS"},
+           {"$TARGET", "(1) : Expected 'TARGET_TYPE' when read TARGET"},
+           {"$TARGET_TYPE = 'x'", "(1) : Expected quoted string when read 'x'"},
            {"$TARGET_TYPE \"x\"", "(1) : Expected = after TARGET_TYPE when read \"x\""},
            {"$TARGET_TYPE = \"x\"\n$",
             "(1) : Only target types \"Application\",\"Static Library\",\"Console Application\",\"Dynamic-Link "
