@@ -3,6 +3,7 @@
 
 #include <gtest/gtest.h>
 
+#include <cstdlib>
 #include <utility>
 
 #include "text/trace.h"
@@ -13,9 +14,18 @@ namespace qrex {
 class WorldTest : public ::testing::Test, protected World, public TraceHook {
  protected:
   WorldTest() { SetTraceHook(this); }
-  ~WorldTest() override { SetTraceHook(nullptr); }
+  ~WorldTest() override {
+    SetTraceHook(nullptr);
+    setenv("PATH", m_path.c_str(), 1);
+  }
   void OnTrace(std::string_view text) override { trace += text; }
   std::string TakeTrace() { return std::exchange(trace, {}); }
+
+  // A program that is a script of the shell; tests are free to change PATH.
+  static void WriteProgram(const std::string& path, const std::string& script) {
+    Write(path, "#!/bin/sh\n" + script);
+    std::filesystem::permissions(path, std::filesystem::perms::owner_all);
+  }
 
   // Writes the project and loads it, with what it depends on, into the workspace.
   Project& AddProject(const std::string& directory, std::string_view targetType, const std::string& statements) {
@@ -27,6 +37,7 @@ class WorldTest : public ::testing::Test, protected World, public TraceHook {
   std::string trace;
 
  private:
+  const std::string m_path = std::getenv("PATH");
   const OwnFolder m_folder{::testing::TempDir()};
 };
 

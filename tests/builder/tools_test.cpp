@@ -18,22 +18,16 @@ namespace {
 
 class ToolsTest : public WorldTest {
  protected:
-  ToolsTest() : m_path(std::getenv("PATH")) {
+  ToolsTest() {
     settings.platformEnvironments["x64"] = {"tools;/usr/bin;/bin", "", ""};
     ApplyEnvironment(settings.platformEnvironments["x64"]);
     for (const char* tool :
          {"cl", "gcc-4", "ml", "ml64", "rc.exe", "link.exe", "lib.exe", "mt.exe", "g++", "clang++", "wineg++", "ar"}) {
-      AddTool(tool,
-              "echo \"$(basename \"$0\") $*\" >> log\n"
-              "for word; do case $word in @*) cat < \"${word#@}\" >> log; echo >> log;; esac; done\n"
-              "[ ! -f say ] || cat say\n[ ! -f status ] || exit $(cat status)\n");
+      WriteProgram(std::string("tools/") + tool,
+                   "echo \"$(basename \"$0\") $*\" >> log\n"
+                   "for word; do case $word in @*) cat < \"${word#@}\" >> log; echo >> log;; esac; done\n"
+                   "[ ! -f say ] || cat say\n[ ! -f status ] || exit $(cat status)\n");
     }
-  }
-  ~ToolsTest() override { setenv("PATH", m_path.c_str(), 1); }
-
-  static void AddTool(const std::string& name, const std::string& script) {
-    Write("tools/" + name, "#!/bin/sh\n" + script);
-    std::filesystem::permissions("tools/" + name, std::filesystem::perms::owner_all);
   }
   static std::string TakeLog() {
     const std::string log = FileExists("log") ? ReadText("log") : "";
@@ -66,9 +60,6 @@ class ToolsTest : public WorldTest {
     trace.clear();
     return *builder;
   }
-
- private:
-  std::string m_path;
 };
 
 // --- Compilers
@@ -313,7 +304,7 @@ TEST_F(ToolsTest, WordsAreThoseThatTheToolWouldRead) {
 }
 
 TEST_F(ToolsTest, ALauncherMayFailForEveryFamily) {
-  AddTool("lead", "echo \"lead $*\" >> log; \"$@\"\nexit 3\n");
+  WriteProgram("tools/lead", "echo \"lead $*\" >> log; \"$@\"\nexit 3\n");
   settings.launcher = {"lead", "a b"};
   AddApp("Application", "\"x.cpp\"");
   Write("tree/app/src/x.cpp", "int x;\n");
@@ -421,7 +412,7 @@ TEST_F(ToolsTest, FailedLinks) {
       "Linking...\nlink.exe @\"x64/Debug/app/linker.rsp\"\nReturn code : 5\nx64/Debug/app/linker.rsp:  \"a.obj\"\n",
       trace);
   trace.clear();
-  AddTool("link.exe", "touch lib/x64/Debug/app.exe\n");
+  WriteProgram("tools/link.exe", "touch lib/x64/Debug/app.exe\n");
   ASSERT_FALSE(Link({"a.obj"}));
   ASSERT_EQ("Linking...\nmt.exe @\"x64/Debug/app/mt.rsp\" /nologo\nReturn code : 5\n", trace);
   ASSERT_FALSE(FileExists("lib/x64/Debug/app.exe"));

@@ -130,22 +130,12 @@ TEST_F(ConfigTest, Messages) {
            {"compiler =", "(1) : Invalid option : EOS"},
            {"runtime = \"built\"", "(1) : Invalid option : \"built\""},
            {"\n\nmoed = clean", "(3) : Syntax error: moed"},
-           {"translateOnly = yes", "(1) : Expected false/true after = when read yes"},
            {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},
            {"jobs = -1", "(1) : Expected number after = when read -"},
-           {"jobs = 9999999", "(1) : Expected number after = when read 9999999"},
-           {"launcher = ccache", "(1) : Expected quoted string when read ccache"},
-           {"launcher += { }", "(1) : Expected = after launcher when read +="},
-           {"PATH('a') = { }", "(1) : Expected double quoted string after ( when read 'a'"},
-           {"PATH = { }", "(1) : Expected ( after PATH when read ="},
-           {"LIB(\"a\") { }", "(1) : Expected = after ) when read {"},
            {"INCLUDE(\"a\") += \"b\"", "(1) : Expected { after += when read \"b\""},
-           {"virtualTree = { \"a\"", "(1) : Expected quoted string when read EOS"},
-           {"config = Debug", "(1) : Expected quoted string when read Debug"},
            {"config = (\"a\"", "(1) : Expected ) after \"a\" when read EOS"},
            {"$\"a\" = \"b\"", "(1) : Expected identifier after $ when read \"a\""},
            {"$a \"b\"", "(1) : Expected = after a when read \"b\""},
-           {"}", "(1) : Syntax error: }"},
        }) {
     AssertFails(text, std::string("\nmain.qrex") + message + "\n");
   }
@@ -168,26 +158,6 @@ TEST_F(ConfigTest, Imports) {
   Write("bad", "\nmode = bad");
   AssertFails("\n\n@import\n\"bad\"",
               "\nbad(2) : Invalid option : bad\n\nmain.qrex(3) : while processing @import of bad\n");
-}
-
-TEST_F(ConfigTest, SearchOfImports) {
-  Write("p/x", "");
-  Write("tree/x", "");
-  Write("tree/y", "");
-  Write("more/y", "");
-  settings.context.importPaths = {"none", "p"};
-  settings.virtualTree = {"tree", "more"};
-  std::string found, root;
-  EXPECT_TRUE(FindImport(settings, "x", found));
-  EXPECT_EQ("p/x", found);
-  EXPECT_TRUE(FindImport(settings, "y", found));
-  EXPECT_EQ("tree/y", found);
-  EXPECT_TRUE(FindImport(settings, "more/y", found));
-  EXPECT_EQ("more/y", found);
-  EXPECT_FALSE(FindImport(settings, "z", found) || FindImport(settings, "tree", found));
-  std::filesystem::remove("tree/y");
-  EXPECT_TRUE(FindInTree(settings, "y", root, found));
-  EXPECT_EQ("more|more/y", root + "|" + found);
 }
 
 TEST_F(ConfigTest, Validation) {

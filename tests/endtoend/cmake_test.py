@@ -5,15 +5,10 @@ import os
 import re
 import shutil
 import subprocess
-import sys
-import tempfile
-import time
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import ROOT, Workspace, equal, holds, lacks, need, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 PAGE = (ROOT / "docs/cmake.md").read_text()
 TOLD = 'goods::Item\n    string8 name = rope\n    [unit("m")] float64 length = 12.5\n    costs 10\n'
 NEW_HEADER = '@import "Vesk/vxObject/IObject.h"\nnamespace goods { $class+ Box { public: $int32 size; }; }\n'
@@ -48,8 +43,7 @@ class Build(Workspace):
         return done.stdout
 
     def edit(self, name, old, new):
-        time.sleep(0.01)  # a tick of the clock of stamps
-        self.replace(f"stock/{name}", old, new)
+        super().edit(f"stock/{name}", old, new)
 
 
 def of_example(*tools, prefix="usr local"):
@@ -64,7 +58,7 @@ def of_example(*tools, prefix="usr local"):
 
 
 @of_example()
-def page(build):
+def test_page(build):
     """The first steps. A second run has nothing to do; what is edited, added and removed is seen, and no more is made."""
     file, steps = blocks("CMake")[:2]
     equal(file, (build.example / "CMakeLists.txt").read_text())
@@ -95,7 +89,7 @@ def page(build):
 
 
 @of_example()
-def settings(build):
+def test_settings(build):
     """What sets keys is an input like any other, and another translator or line translates anew."""
     build.shell("cmake -G Ninja -B build -DCMAKE_BUILD_TYPE=Debug && ninja -C build")
     translated = "stock/build/qrex/stock/qrexsource/**/*.h"
@@ -116,7 +110,7 @@ def settings(build):
 
 
 @of_example()
-def errors(build):
+def test_errors(build):
     build.edit("CMakeLists.txt", "PROJECT goods", "PROJECT wares")
     holds(build.shell("cmake -G Ninja -B build", status=1), "no project wares")
     build.edit("CMakeLists.txt", "PROJECT wares", "PROJECT goods")
@@ -133,7 +127,7 @@ def errors(build):
 
 
 @of_example("make")
-def generators(build):
+def test_generators(build):
     """From clean with a translator that takes its time: nothing is compiled ahead of what it includes."""
     slow = build.path("slow")
     build.write("slow", f'#!/bin/sh\nsleep 0.5\nexec "{build.prefix}/bin/Qrex" "$@"\n')
@@ -153,7 +147,7 @@ def generators(build):
 
 
 @of_example()
-def configurations(build):
+def test_configurations(build):
     """The presets of the example: each configuration of a build has its own translations."""
     build.shell("cmake --preset debug && cmake --build --preset debug && build/debug/stock")
     build.shell("cmake --preset multi")
@@ -182,13 +176,12 @@ add_library(stock_goods STATIC)
 qrex_translate(TARGET stock_goods WORKSPACE stock.qrex PROJECT goods)
 target_link_libraries(stock_goods PUBLIC Qrex::Runtime)
 """
-WAYS = ["add_subdirectory(../stock stock)",
-        "include(FetchContent)\nFetchContent_Declare(stock SOURCE_DIR ${CMAKE_CURRENT_SOURCE_DIR}/../stock)\n"
-        "FetchContent_MakeAvailable(stock)"]
+WAYS = ["add_subdirectory(../stock stock)", "include(FetchContent)\nFetchContent_Declare(stock SOURCE_DIR "
+        "${CMAKE_CURRENT_SOURCE_DIR}/../stock)\nFetchContent_MakeAvailable(stock)"]
 
 
 @of_example("make")
-def parts_of_one_workspace(build):
+def test_parts_of_one_workspace(build):
     build.write("stock/CMakeLists.txt", LIBRARY)
     build.edit("tree/stock.qrws", '"goods"', '"goods"\n    "prices"')
     build.write("stock/tree/prices/src/prices.qrpj", (build.example / "tree/goods/src/goods.qrpj").read_text()
@@ -209,7 +202,7 @@ def parts_of_one_workspace(build):
 
 
 @of_example()
-def without_the_built_runtime(build):
+def test_without_the_built_runtime(build):
     """From a build folder of the tool, and from an installation without the library, the runtime is made with the project."""
     shutil.rmtree(build.prefix / "lib/qrex")
     for options in ("", f"-DQrex_DIR='{Path(build.binary).parent}'"):
@@ -221,7 +214,7 @@ def without_the_built_runtime(build):
 
 
 @of_example("meson")
-def meson(build):
+def test_meson(build):
     file, script, steps = blocks("Meson")
     build.write("stock/meson.build", file)
     build.write("stock/translate.sh", script)
@@ -236,7 +229,7 @@ def meson(build):
 
 
 @of_example("make", "awk", prefix="usr")  # make takes no name with a blank
-def plain_make(build):
+def test_plain_make(build):
     file, steps = blocks("make")
     build.write("stock/Makefile", file)
     holds(build.shell(steps), TOLD)
@@ -255,4 +248,4 @@ def plain_make(build):
     lacks(build.shell("make && ./stock"), "box.cpp")
 
 
-run_tests([page, settings, errors, generators, configurations, parts_of_one_workspace, without_the_built_runtime, meson, plain_make])
+run_tests(globals())

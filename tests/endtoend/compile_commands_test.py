@@ -4,13 +4,9 @@
 import json
 import shutil
 import subprocess
-import sys
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from workspace_fixture import ROOT, SETTINGS, Skipped, Workspace, equal, holds, in_workspace, lacks, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 EXAMPLES = {"cmake": "stock", "evolution": "evolution", "first": "first", "remote": "remote", "shapes": "geometry", "tour": "tour"}
 NAME = "compile_commands.json"
 HEAD = '$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n'
@@ -53,7 +49,7 @@ def newest(name, versions):
 
 
 @in_workspace(FILES, "gcc")
-def files(workspace):
+def test_files(workspace):
     """Those of all projects that are compiled, whether translated or not, in all modes alike."""
     workspace.run("all.qrex")
     first = workspace.path(NAME).read_text()
@@ -73,7 +69,7 @@ def files(workspace):
 
 
 @in_workspace(FILES)
-def only_where_asked(workspace):
+def test_only_where_asked(workspace):
     for line in ("compileCommands=false", "mode=clean"):
         workspace.run("all.qrex", line)
         assert not workspace.path(NAME).exists(), line
@@ -86,7 +82,7 @@ def only_where_asked(workspace):
 
 
 @in_workspace(FILES)
-def visual(workspace):
+def test_visual(workspace):
     """Words of cl, which clang takes by that name."""
     workspace.run("all.qrex", "compiler=vc14", "mode=gen")
     entry = entries(workspace)[2]
@@ -117,7 +113,7 @@ def in_examples(check):
 
 
 @in_examples
-def examples_compile(workspace, own):
+def test_examples_compile(workspace, own):
     words = {entry["file"]: entry["arguments"] for entry in entries(workspace)}
     for file in own:
         workspace.path(words[file][words[file].index("-o") + 1]).parent.mkdir(parents=True, exist_ok=True)
@@ -126,18 +122,10 @@ def examples_compile(workspace, own):
 
 
 @in_examples
-def clang_tidy(workspace, own):
-    tidy = newest("clang-tidy", (19, 14))
-    for file in own:
-        told = workspace.shell(f"{tidy} --checks='-*,bugprone-use-after-move' '{file}' 2>&1")
-        lacks(told, "error:")
-
-
-@in_examples
-def clangd(workspace, own):
+def test_clangd(workspace, own):
     server = newest("clangd", (19,))
     for file in own:
         holds(workspace.shell(f"{server} --check='{file}' --check-locations=0 2>&1"), "compile_commands.json", "completed, 0 errors")
 
 
-run_tests([files, only_where_asked, visual, examples_compile, clang_tidy, clangd])
+run_tests(globals())

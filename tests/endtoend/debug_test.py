@@ -2,13 +2,9 @@
 """What debuggers show of programs: gdb with the printers of the runtime, and the file for the debugger of Visual Studio."""
 
 import re
-import sys
 import xml.etree.ElementTree as XmlTree
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from runtime_fixture import ROOT, TOUR, build  # noqa: E402
-from workspace_fixture import CACHE, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import CACHE, ROOT, Workspace, equal, holds, lacks, need, run_tests
 
 PRINTERS = ROOT / "runtime/debug/vesk_gdb.py"
 NATVIS = ROOT / "runtime/debug/vesk.natvis"
@@ -26,30 +22,11 @@ def gdb(workspace, program, *commands, options=f"-x {PRINTERS}"):
     return output
 
 
-# A print that meets memory which cannot be read ends a file of commands, but not a session.
-SHOW = """python
-def show(expression):
-    try:
-        gdb.write(f"tried {expression}: ")
-        gdb.execute(f"output {expression}")
-        gdb.write("\\n")
-    except gdb.MemoryError as error:
-        gdb.write(f"{error}\\n")
-end"""
-
-
-def line_of(workspace, source, text):
-    """A place for `break`: the line of generated text that begins with this."""
-    name = f"qrexsource/x64/Debug/{source}"
-    lines = workspace.path(name).read_text().splitlines()
-    return f"{Path(source).name}:{next(i for i, line in enumerate(lines, 1) if line.strip().startswith(text))}"
-
-
 HEADER = """@import "Vesk/vxObject/IObject.h"
 namespace more
 {
 $interface+ INamed : vesk::IObject { string8 Name() const; };
-$mixin Counted { $int32 counter; $dep int32 twice = { twice = counter * 2; }; };
+$mixin Counted { $int32 counter; $dep int32 twice = { twice = counter * 2; }; $cache int32 plus(int32 n) const { return counter + n; } };
 $class+ Cat isa INamed : model { string8 hue; } mixin [ Counted ] { public: vesk::string8 Name() const { return "cat"; } };
 $enum+ class Refined { One = 1, default Two = 20 };
 $variant+ Value { *float64; int32; string8; *{ string8 s; } big; *int32 num; void nothing; };
@@ -62,11 +39,18 @@ VALUES = [("numbers", "vesk::DynArray<int32> numbers{1, 2}", "vesk::DynArray of 
           ("none", "vesk::openvariant<int32> none", "empty"),
           ("text", 'vesk::openvariant<int32> text(vesk::string8("hi"))', 'vesk::basic_xstring<char>: "hi"'),
           ("wide", "vesk::string16 wide(3, u'x')", 'u"xxx"'),
-          ("cat", "more::Cat cat; cat.counter = -1", 'more::Cat of release 2 = {hue = "", counter = -1, twice = stale}'),
+          ("cat", "more::Cat cat; cat.counter = -1", 'more::Cat of release 2 = {hue = "", counter = -1, twice = stale, plus() = cache}'),
           ("near", "vesk::ptr<more::INamed> near(&cat)", "more::Cat at 0x"),
           ("nobody", "vesk::ptr<more::INamed> nobody", "null"),
           ("kept", "vesk::cref<more::Cat> kept(&cat)", "more::Cat at 0x"),
           ("deque", "vesk::xdeque<int32> deque; deque.push_back(4)", "vesk::xdeque with 1 element = {4}"),
+          ("names", 'vesk::xmap<vesk::string8, int32> names; names["a"] = 2', 'vesk::xmap with 1 element = {["a"] = 2}'),
+          ("shared", "more::Cat shared; shared.counter = 1; shared.twice.read(); shared.plus(3)",
+           'more::Cat of release 2 = {hue = "", counter = 1, twice = 2, plus() = cache = {[3] = 4}}'),
+          ("raw", "alignas(more::Cat) char bytes[sizeof(more::Cat)]; std::memset(bytes, 0x7f, sizeof bytes);"
+                  "more::Cat& raw = reinterpret_cast<more::Cat&>(bytes); (void)raw",
+           "more::Cat of release 2 = {hue = <error: Cannot access memory at address 0x7f7f7f7f7f7f7f7f>, counter = 2139062143, "
+           "twice = not initialised, plus() = cache}"),
           ("keys", "vesk::xset<int32> keys; keys.Insert(4)", "vesk::xset with 1 element = {[0] = 4}"),
           ("on_heap", "more::Value on_heap(2.5)", "2.5"),
           ("in_place", "more::Value in_place(vesk::int32(7))", "7"),
@@ -78,7 +62,7 @@ VALUES = [("numbers", "vesk::DynArray<int32> numbers{1, 2}", "vesk::DynArray of 
           ("two", "vesk::Array<more::Refined, 2> two", "vesk::Array of length 2 = {Two, Two}")]
 
 
-def first_workspace(binary):
+def test_first_workspace(binary):
     """An enumeration by its label, and values of other kinds. The program names the printers itself; gdb loads them if it may."""
     need("g++", "gdb")
     with Workspace(binary, {}) as workspace:
@@ -101,41 +85,6 @@ def first_workspace(binary):
             holds(there, f"\n{name} = {printed}")
         holds(there, '$1 = {name = "Leo", diet = Meat, weight = 200}\n', "$2 = 7\n")
         holds(gdb(workspace, "zoo_app", *stop, "print leo.diet", options="-iex 'set auto-load safe-path /nowhere'"), "m_value = 1")
-
-
-def the_tour(binary):
-    """Values of all kinds, where they are set, stale, and where nothing is yet."""
-    need("g++", "gdb")
-    with build(binary, TOUR / "tree", "tour.qrws") as workspace:
-        changed, many, shared = (line_of(workspace, "app/src/app.cpp", text) for text in (
-            'xout() << order << ", " << order.Summary()', 'show("many")', 'xout() << "    the forecast'))
-        output = gdb(
-            workspace, "app", SHOW,
-            # No object is made yet: what stands there is what others left.
-            "break app::ChangeModel", "run >/dev/null", *[
-                f"python show('{{{type_}}}{at}')" for at in ("$sp", "($sp+8)", "($sp+24)", "$rip", "0") for type_ in (
-                    "orders::Order", "app::Shop", "orders::Payment", "orders::Priority", "orders::Address",
-                    "vesk::xmap<vesk::basic_xstring<char>,int>")],
-            f"break {changed}", "continue", "echo order:\\n", "print order", "print order.extras", "print order._model_.remarks",
-            f"break {many}", "continue", "echo many:\\n", "print shop", "print shop.subtotal", "print shop.price",
-            f"break {shared}", "continue", "echo shared:\\n", "print shop", "print shop._dn_Forecast",
-            "break orders::Describe(int)", "continue", "up 2", "echo kinds:\\n", "print payments", "print read[1]", "up -1",
-            "print a")
-        holds(output, "tried {app::Shop}$sp: ", "not initialised", "tried {app::Shop}0: Cannot access memory", "order:\n")
-        holds(output, "order:\n$", 'orders::Order of release 3 = {customer = "Di", pieces = 0, price = 0, points = 3, '
-              'priority = Low, remarks = vesk::xvector of length 1, capacity 2 = {"heavy"}, '
-              'extras = vesk::xmap with 1 element = {["wrapping"] = 2}, grades = vesk::Array of length 3 = {0, 4, 0}, '
-              'address = orders::Address of release 3 = {street = "", number = 12}, previous = null, counter = 1, '
-              'm_archived = true, m_status = orders::Open}\n',
-              "many:\n", "price = 2, pieces = 40, subtotal = stale, was 8, isLarge = stale, was false, ",
-              'label = stale, was "small", ',
-              "= stale, was 8\n", "= 2\n",
-              "shared:\n", "subtotal = 80, isLarge = true, label = \"large\", ",
-              "Share() = cache = {[{first = 4, second = 2}] = 10, [{first = 5, second = 2}] = 8}, Forecast() = stale, ",
-              "= stale\n",
-              "kinds:\n", "= vesk::xvector of length 4, capacity 4 = {void, card({digits = 4711}), "
-              "purse({coins = vesk::xvector of length 2, capacity 2 = {5, 20}}), transfer(2.5)}\n",
-              "= card({digits = 4711})\n", "= 3\n")
 
 
 # --- The file for Visual Studio
@@ -167,7 +116,7 @@ def members(name):
     return words
 
 
-def natvis(_):
+def test_natvis(_):
     """By the schema, and what it names is declared in the runtime's headers, with as many parameters."""
     root = XmlTree.parse(NATVIS).getroot()
     equal(root.tag, SPACE + "AutoVisualizer")
@@ -187,4 +136,4 @@ def natvis(_):
             holds(re.search(rf"enum class {scope}\b[^;]*;", headers).group(), word)
 
 
-run_tests([first_workspace, the_tour, natvis])
+run_tests(globals())

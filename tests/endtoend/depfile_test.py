@@ -3,12 +3,9 @@
 nothing else does."""
 
 import os
-import sys
 import time
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
 NAMES = ["a b.h", "c$d.h", "e#f.h", "g:h.h", "i\\j.h", "back\\ slash.h", "k%l.h", "o(p)~[q].h", "a=b.h", "s,t+u@v!w.h", "x$$y.h",
          "{curly}.h", "-minus.h", "ü.h"]
@@ -59,21 +56,21 @@ def is_asked_again(workspace, command, idle):
 
 
 @in_workspace({**FILES, "build.ninja": NINJA}, "ninja")
-def ninja(workspace):
+def test_ninja(workspace):
     is_asked_again(workspace, "ninja -v", "no work to do")
     lacks(workspace.shell("ninja -t deps"), "stale")
     equal(workspace.times("out/*.d"), {})  # read into ninja's own log
 
 
 @in_workspace({**FILES, "makefile": MAKE}, "make")
-def make(workspace):
+def test_make(workspace):
     is_asked_again(workspace, "make", "Nothing to be done")
     holds(workspace.path("out/app.d").read_text(), "out/app.d qrexsource/x64/Debug/lib/lib.h out/include/lib/lib.h "
           "out/source/lib/lib.h qrexsource/x64/Debug/app/src/-minus.h", "app.cpp: \\\n  all.qrex \\\n")
 
 
 @in_workspace({**FILES, "elsewhere/none": ""})
-def from_another_folder(workspace):
+def test_from_another_folder(workspace):
     """A build has its outputs where it likes; the configuration is as it is."""
     workspace.run("all.qrex")
     here = workspace.path("out/app.d").read_text()
@@ -86,7 +83,7 @@ def from_another_folder(workspace):
 
 
 @in_workspace(FILES, "g++")
-def modes_and_failures(workspace):
+def test_modes_and_failures(workspace):
     """One is written behind a run that has done all that it was told, and is whole or as it was."""
     workspace.run("all.qrex", "mode=gen", "compiler=gcc")
     text = workspace.path("out/app.d").read_text()
@@ -112,4 +109,4 @@ def modes_and_failures(workspace):
     holds(workspace.run("all.qrex", 'depfile="tree/all.qrws/app.d"', status=1), "Error: ", "tree/all.qrws/app.d")
 
 
-run_tests([ninja, make, from_another_folder, modes_and_failures])
+run_tests(globals())

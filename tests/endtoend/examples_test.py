@@ -4,14 +4,10 @@ programs: by the tool itself and by make. The same sources and descriptions serv
 
 import shutil
 import subprocess
-import sys
 import xml.etree.ElementTree as XmlTree
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import COMPILERS, Skipped, Workspace, equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import COMPILERS, ROOT, Skipped, Workspace, equal, holds, lacks, need, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 SHAPES = """class geo::Box
     geo::Point[2] corners
 class geo::Canvas
@@ -67,7 +63,7 @@ def copy(binary, folder):
     return workspace
 
 
-def a_run_builds_them(binary):
+def test_a_run_builds_them(binary):
     need("g++")
     for folder, name, program, expected in EXAMPLES[:-1]:  # that of the tour stands in runtime_test.py
         with copy(binary, folder) as workspace:
@@ -75,7 +71,7 @@ def a_run_builds_them(binary):
             equal(workspace.shell(f"out/lib/x64/Debug/{program}"), expected)
 
 
-def make_builds_them(binary):
+def test_make_builds_them(binary):
     need("g++", "make")
     for folder, name, program, expected in EXAMPLES:
         with copy(binary, folder) as workspace:
@@ -90,7 +86,7 @@ def make_builds_them(binary):
                 equal([path for top in ("x64", "out/lib") for path in workspace.path(top).rglob("*") if path.is_file()], [])
 
 
-def processes_call_each_other(binary):
+def test_processes_call_each_other(binary):
     """A server and two clients, each a process of its own."""
     need("g++")
     asio = subprocess.run(["g++", "-E", "-x", "c++", "-include", "boost/asio.hpp", "/dev/null"], capture_output=True)
@@ -112,7 +108,7 @@ def processes_call_each_other(binary):
         holds(workspace.shell("out/lib/x64/Debug/board post port Cy late", status=1), "board: cannot connect to 127.0.0.1: ")
 
 
-def one_description_serves_every_compiler(binary):
+def test_one_description_serves_every_compiler(binary):
     for folder, name, program, _ in EXAMPLES + [("remote", "remote", "board", "")]:
         with copy(binary, folder) as workspace:
             for compiler in COMPILERS:
@@ -121,6 +117,7 @@ def one_description_serves_every_compiler(binary):
                     holds(output, "\nCompleted.")
                     for word in ("Error", "ERROR", "arning"):
                         lacks(output, word)
+                lacks(workspace.run(f"{name}.qrex", f"compiler={compiler}", "mode=gen"), "\nWriting ")
             generated = list(workspace.folder.iterdir())
             for path in generated:
                 if path.suffix in (".vcproj", ".vcxproj", ".filters", ".cbp", ".workspace"):
@@ -136,4 +133,4 @@ def one_description_serves_every_compiler(binary):
                     lacks(text, "ar rcs")
 
 
-run_tests([a_run_builds_them, make_builds_them, processes_call_each_other, one_description_serves_every_compiler])
+run_tests(globals())

@@ -1,19 +1,17 @@
 #!/usr/bin/env python3
-"""Whole runs with faults: errors in the middle, faults of the disk, runs that are killed.
+"""Whole runs with faults: errors in the middle, what is in the way, other runs. Failing calls and kills: tests/faults.
 
 Usage: faults_test.py BINARY [TEST...]. Each test is a function that works in a folder of its own."""
 
-import fcntl
 import os
 import re
 import shutil
-import stat
 import subprocess
 import time
 
-from run_fixture import (BINARY, DEPENDENCIES, TRANSLATED, EACH_RUN, JUNK, write, read, write_tree, run, expect, files_of,
-                         leftovers, contents, changed, edit, dependencies, run_named)
-from workspace_fixture import Skipped, holds, lacks
+from run_fixture import (BINARY, DEPENDENCIES, TRANSLATED, EACH_RUN, write, read, write_tree, run, expect, leftovers, contents, edit,
+                         run_named)
+from workspace_fixture import holds, lacks
 
 
 # --- Errors in the middle
@@ -111,78 +109,10 @@ def test_standard_output_that_takes_nothing():
     expect(process.wait() == 0, 'status')
 
 
-def test_what_is_no_plain_file():
-    write_tree()
-    run()
-    for path in ['tree/app/c.h', 'tree/app/n.txt', TRANSLATED + 'src/app.cpp', 'tree/.qrwsroot']:
-        os.remove(path)
-        os.mkfifo(path)
-    holds(run(status=1), "Couldn't open file tree/app/c.h\n")
-    holds(run('main.qrex', 'mode=show', '$COMPILE_FILE_PATH = "tree/app/a.h"', status=1), 'Search for .qrwsroot failed\n')
-    os.remove('tree/app/c.h')
-    write('tree/app/c.h', 'int c;\n')
-    text = run()
-    holds(text, f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n', '\nCompleted')
-    lacks(text, '...Copy file failed')
-    expect(stat.S_ISREG(os.stat(TRANSLATED + 'src/app.cpp').st_mode), 'the output is written anew')
-    holds(subprocess.run([BINARY, '/dev/stdin'], input=read('main.qrex'), stdout=subprocess.PIPE).stdout.decode(),
-          '\nCompleted')  # a configuration may come through a pipe
-
-
-def test_full_disk():
-    write_tree({'tree/app/c.h': 'int c;\n' * 1000})
-    text = run(status=1, limit=4096)
-    holds(text, f'Error: File error ({TRANSLATED}c.h) : ')
-    expect(not os.path.exists(TRANSLATED + 'c.h'), 'half-written')
-    expect(not leftovers(), 'temporaries stay behind')
-    expect(dependencies()[0]['app/b.h'][1] != 0, 'what was finished is kept')
-    run()
-    whole = contents('qrexsource', 'out')
-    edit('tree/app/c.h', 'int c2;\n' * 1000)
-    run(status=1, limit=4096)
-    after = contents('qrexsource', 'out')
-    expect([path for path in whole if after[path] != whole[path]] in ([], [DEPENDENCIES]), 'the old files stay')
-    run()
-    expect(read(TRANSLATED + 'c.h').count(b'c2') == 1000, 'the next run recovers')
-
-
-def test_full_disk_on_a_file_system():
-    os.mkdir('small')
-    mount = subprocess.run(['mount', '-t', 'tmpfs', '-o', 'size=256k', 'tmpfs', 'small'], stderr=subprocess.DEVNULL)
-    if mount.returncode != 0:
-        raise Skipped('mount')
-    try:
-        os.chdir('small')
-        write_tree({'tree/app/c.h': 'int c;\n' * 20000})
-        text = run(status=1)
-        holds(text, f'Error: File error ({TRANSLATED}c.h) : There is not enough space on the disk.\n')
-        expect(not os.path.exists(TRANSLATED + 'c.h') and not leftovers(), 'half-written')
-    finally:
-        os.chdir('..')
-        subprocess.run(['umount', 'small'])
-
-
 # --- Runs that are killed
 
 def without_times(files):
     return {path: content for path, content in files.items() if path not in EACH_RUN}
-
-
-def test_leftovers_of_killed_runs_are_removed():
-    write_tree()
-    run()
-    wanted = without_times(contents('qrexsource', 'out'))
-    for path in files_of('qrexsource', 'out') + ['projects.guids']:
-        write(f'{path}.qrex-{os.getpid()}.part', JUNK)  # whose process does not matter: nobody holds it
-    others = ['projects.guids.qrex-12.part', 'projects.guids.part']  # of a run that goes on, of the user
-    for path in others:
-        write(path, JUNK)
-    held = open(others[0])
-    fcntl.flock(held, fcntl.LOCK_EX)
-    subprocess.run('find qrexsource out -type f ! -name "*.part" -delete', shell=True)
-    run()
-    expect(without_times(contents('qrexsource', 'out')) == wanted, contents('qrexsource', 'out').keys())
-    expect(sorted(leftovers()) == sorted(others), leftovers())
 
 
 def test_runs_at_the_same_time():

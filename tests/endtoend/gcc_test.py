@@ -1,93 +1,20 @@
 #!/usr/bin/env python3
-"""Builds with the real tools of the gcc family: by the tool itself, and through the make files that it generates."""
+"""Builds with the real tools of the gcc family. Through make files: examples_test.py and init_test.py."""
 
-import sys
-from pathlib import Path
+from workspace_fixture import PROGRAM_FILES as FILES, SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
-
-# A program, a dynamic library that it uses, and a static library that both use.
-FILES = {
-    "all.qrex": SETTINGS,
-    "tree/.qrwsroot": "",
-    "tree/all.qrws": '"all" { "app" }\n',
-    "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -g -Wall -fPIC -MMD }\n',
-    "tree/base/src/base.qrpj": """$TARGET_TYPE = "Static Library"
-$ROOT_TO_PROJDIR = "base"
-@import "common.inc"
-qrex
-{ "numbers.h" "src" { "base.cpp" "numbers.cpp" } }
-""",
-    "tree/base/numbers.h": """@def names =
-{
-    [ one, two, three ]
-}
-enum Number
-{
-    @for (name in names) {name,
-    }
-};
-const char* NameOf(Number number);
-""",
-    "tree/base/src/numbers.cpp": """@import "base/numbers.h"
-const char* NameOf(Number number)
-{
-    @for (name in names) {if (number == name) return @str(name);
-    }
-    return "";
-}
-""",
-    "tree/base/src/base.cpp": "int baseVersion = 1;\n",
-    "tree/shape/src/shape.qrpj": """$TARGET_TYPE = "Dynamic-Link Library"
-$ROOT_TO_PROJDIR = "shape"
-@import "common.inc"
-subproj { "base" }
-+link { -shared -L"out/lib/x64/Debug" }
-qrex
-{ "shape.h" "src" { "shape.cpp" "area.c" } }
-""",
-    "tree/shape/shape.h": 'extern "C" int Area(int a, int b);\nconst char* Corners();\n',
-    "tree/shape/src/shape.cpp": """@import "shape/shape.h"
-@import "base/numbers.h"
-const char* Corners()
-{
-    return NameOf(three);
-}
-""",
-    "tree/shape/src/area.c": "int Area(int a, int b) { return a * b; }\n",
-    "tree/app/src/app.qrpj": """$TARGET_TYPE = "Console Application"
-$ROOT_TO_PROJDIR = "app"
-@import "common.inc"
-subproj { "shape" "base" }
-+link { -L"out/lib/x64/Debug" -Wl,-rpath,out/lib/x64/Debug }
-qrex
-{ "src" { "app.cpp" "parts.cpp" "parts.h" } }
-""",
-    "tree/app/src/parts.h": "int Parts();\n",
-    "tree/app/src/parts.cpp": '@import "parts.h"\nint Parts()\n{\n    return 2;\n}\n',
-    "tree/app/src/app.cpp": """@import "parts.h"
-@import "shape/shape.h"
-@import "base/numbers.h"
-#include <cstdio>
-int main()
-{
-    std::printf("%s %s %d %d\\n", NameOf(two), Corners(), Area(6, 7), Parts());
-}
-""",
-}
 PROGRAM = "out/lib/x64/Debug/app"
-RESULT = "two three 42 2\n"
+RESULT = "a $ debug 1 2\n"
 OBJECTS = "x64/**/*.o"
 LIBRARIES = "out/lib/x64/Debug/*"
 
 
 @in_workspace(FILES, "g++")
-def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
+def test_builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     output = workspace.run("all.qrex")
-    holds(output, "- base  [", "Linking...", "- shape  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
+    holds(output, "- lib  [", "Linking...", "- dll  [", "Linking...", "- app  [", "Linking...", "\nCompleted....")
     equal(sorted(workspace.times(LIBRARIES)),
-          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
+          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libdll.so", "out/lib/x64/Debug/liblib.a"])
     equal(workspace.shell(PROGRAM), RESULT)
     equal(workspace.shell(f"cd / && {workspace.path(PROGRAM)}"), RESULT)  # finds its library from anywhere
 
@@ -95,16 +22,15 @@ def builds_libraries_and_a_program_and_only_what_is_stale(workspace):
     lacks(workspace.run("all.qrex"), "Linking...")
     equal(workspace.changed(objects, OBJECTS) + workspace.changed(targets, LIBRARIES), [])
 
-    workspace.append("tree/shape/shape.h", "int More();\n")
+    workspace.append("tree/lib/lib.h", "int More();\n")
     workspace.run("all.qrex")
-    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
-    equal(workspace.changed(targets, LIBRARIES), ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libshape.so"])
+    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/lib/lib.o"])
+    equal(workspace.changed(targets, LIBRARIES), ["out/lib/x64/Debug/app", "out/lib/x64/Debug/liblib.a"])
     equal(workspace.shell(PROGRAM), RESULT)
 
 
-@in_workspace({**FILES, "tree/common.inc": 'config { "Debug|x64" }\n+cpp { -fPIC }\n',  # debug data names the folder
-               "tree/app/src/app.qrpj": FILES["tree/app/src/app.qrpj"].replace(" -Wl,-rpath,out/lib/x64/Debug", "")}, "g++")
-def a_built_tree_moves_and_two_checkouts_are_equal(workspace):
+@in_workspace(FILES, "g++")
+def test_a_built_tree_moves_and_two_checkouts_are_equal(workspace):
     workspace.shell("mkdir -p one 'another one/b' && cp -r all.qrex tree one && cp -r all.qrex tree 'another one/b'")
     for folder in ("one", "another one/b"):
         holds(workspace.shell(f"cd '{folder}' && Qrex all.qrex"), "\nCompleted....")
@@ -114,34 +40,19 @@ def a_built_tree_moves_and_two_checkouts_are_equal(workspace):
 
 
 @in_workspace(FILES, "g++")
-def messages_point_at_the_source(workspace):
-    workspace.append("tree/base/numbers.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
-    workspace.append("tree/app/src/parts.cpp", "static int unused;\n")
+def test_messages_point_at_the_source(workspace):
+    workspace.append("tree/lib/lib.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
+    workspace.append("tree/app/src/the kind.cpp", "static int unused;\n")
     output = workspace.run("all.qrex")
-    # Each file that imports the header reports it, at the line of the source. Compiling goes on, nothing is linked.
-    holds(output, "tree/base/numbers.h(13) ...\n", "qrexsource/x64/Debug/base/numbers.h:",
+    # Each file that imports the header reports it, at the line of the source. Compiling goes on, the program is not linked.
+    holds(output, "tree/lib/lib.h(4) ...\n", "qrexsource/x64/Debug/lib/lib.h:",
           ": error: 'nowhere' was not declared in this scope\n", "- app  [",
-          "tree/app/src/parts.cpp(6) ...\n", "warning: 'unused' defined but not used",
-          "\nCompleted with 1 warnings, 3 errors.")
-    equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/parts.o", "x64/Debug/base/base.o",
-                                             "x64/Debug/shape/area.o"])
-    equal(workspace.times(LIBRARIES), {})
-    workspace.replace("tree/base/numbers.h", "nowhere", "0")
+          "tree/app/src/the kind.cpp(3) ...\n", "warning: 'unused' defined but not used",
+          "\nCompleted with 1 warnings, 2 errors.")
+    equal(sorted(workspace.times(OBJECTS)), ["x64/Debug/app/the kind.o", "x64/Debug/dll/dll.o"])
+    equal(list(workspace.times(LIBRARIES)), ["out/lib/x64/Debug/libdll.so"])
+    workspace.replace("tree/lib/lib.h", "nowhere", "0")
     holds(workspace.run("all.qrex"), "\nCompleted....")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
-@in_workspace(FILES, "g++")
-def link_errors_are_counted_and_leave_no_target(workspace):
-    workspace.replace("tree/app/src/parts.cpp", "int Parts()", "int Other()")
-    output = workspace.run("all.qrex")
-    holds(output, "- app  [", "Linking...\n", "g++ @\"x64/Debug/app/linker.rsp\"\nReturn code : 1\n",
-          "x64/Debug/app/linker.rsp: -o \"out/lib/x64/Debug/app\" \"x64/Debug/app/parts.o\" \"x64/Debug/app/app.o\" "
-          "\"out/lib/x64/Debug/libshape.so\" \"out/lib/x64/Debug/libbase.a\" -Xlinker -rpath -Xlinker '$ORIGIN' -L\"out/lib/x64/Debug\" -Wl,-rpath,out/lib/x64/Debug\n",
-          "\nCompleted with 0 warnings, 1 errors.")
-    assert not workspace.path(PROGRAM).exists()
-    workspace.replace("tree/app/src/parts.cpp", "int Other()", "int Parts()")
-    workspace.run("all.qrex")
     equal(workspace.shell(PROGRAM), RESULT)
 
 
@@ -154,16 +65,6 @@ PROGRAM_ALONE = {
                              '+cpp { -MMD }\nqrex\n{ "src" { "x.cpp" } }\n',
     "tree/app/src/x.cpp": "int main() { return 7; }\n",
 }
-
-
-@in_workspace(PROGRAM_ALONE, "g++", "make")
-def a_program_without_libraries_is_linked(workspace):
-    holds(workspace.run("all.qrex"), "Linking...\n", "\nCompleted....")
-    workspace.shell(PROGRAM, status=7)
-    workspace.shell("rm -r out x64 qrexsource")
-    workspace.run("all.qrex", "mode=gen")
-    workspace.shell(MAKE)
-    workspace.shell(PROGRAM, status=7)
 
 
 # A program that needs a prepackaged library, a library that a static subproject names, and an assembled file.
@@ -185,7 +86,7 @@ BEHIND_A_LIBRARY = {
 
 
 @in_workspace(BEHIND_A_LIBRARY, "g++")
-def what_switches_name_reaches_the_program(workspace):
+def test_what_switches_name_reaches_the_program(workspace):
     def compile(function, value, output, switches="-c"):
         workspace.write("one.c", f"int {function}() {{ return {value}; }}\n")
         workspace.shell(f"mkdir -p vendor tree/x64/Debug && gcc {switches} -o {output} one.c")
@@ -208,124 +109,15 @@ def what_switches_name_reaches_the_program(workspace):
     workspace.shell(PROGRAM, status=74)
 
 
-def failing_tools_are_counted_and_the_next_run_recovers(binary):
-    need("g++")
-    half_an_object = 'text=$(cat "${2#@}"); object=${text##* -o \\"}; echo half > "${object%%\\"*}"\n'
-    compilers = {
-        "kill -SEGV $$": "ERROR: gcc-4 was ended by signal 11\n",
-        "exit 3": "Return code : 3\n",
-        "chmod a-w \"${object%%\\\"*}\"; exit 4": "Return code : 4\n",  # what it left is read-only
-        # A disk that takes no more than the first blocks of an object.
-        "trap '' XFSZ; ulimit -f 1; exec gcc \"$@\"": "error",
-    }
-    for ending, message in compilers.items():
-        with Workspace(binary, FILES) as workspace:
-            workspace.write("tools/gcc-4", f"#!/bin/bash\n{half_an_object}{ending}\n")
-            output = workspace.run("all.qrex")
-            holds(output, message, "\nCompleted with 0 warnings, ")
-            lacks(output, " 0 errors")
-            lacks(output, "Linking...")
-            equal(workspace.times(OBJECTS), {})
-            workspace.path("tools/gcc-4").unlink()
-            holds(workspace.run("all.qrex"), "\nCompleted....")
-            equal(workspace.shell(PROGRAM), RESULT)
-
-
 @in_workspace(FILES, "g++")
-def missing_tools_are_named_and_counted(workspace):
-    output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
-    holds(output, "ERROR: gcc-4 was not found on PATH\n", "\nCompleted with 0 warnings, 6 errors.")
-    workspace.run("all.qrex")
-    workspace.path(PROGRAM).unlink()
-    output = workspace.run("all.qrex", 'PATH("x64") = { "tools" }')
-    holds(output, "ERROR: g++ was not found on PATH\n", "Return code : 127\n", "\nCompleted with 0 warnings, 1 errors.")
-    workspace.run("all.qrex")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
-@in_workspace(FILES, "g++")
-def captured_output_that_cannot_be_kept_is_an_error(workspace):
+def test_captured_output_that_cannot_be_kept_is_an_error(workspace):
     workspace.write("tools/gcc-4", "#!/bin/sh\nhead -c 3000000 /dev/zero | tr '\\0' x\n")
     output = workspace.shell("ulimit -f 2000; Qrex all.qrex")  # blocks: none of the files of a run is as large
-    holds(output, "cmd /c gcc-4 -c @\"x64/Debug/base/compiler.rsp\" 1>out1.txt 2>&1\n"
-          "ERROR getting stdout\n", "x64/Debug/base/compiler.rsp: ", "\nCompleted with 0 warnings, 6 errors.")
+    holds(output, "cmd /c gcc-4 -c @\"x64/Debug/lib/compiler.rsp\" 1>out1.txt 2>&1\n"
+          "ERROR getting stdout\n", "x64/Debug/lib/compiler.rsp: ", "\nCompleted with 0 warnings, 4 errors.")
     workspace.path("tools/gcc-4").unlink()
     workspace.run("all.qrex")
     equal(workspace.shell(PROGRAM), RESULT)
 
 
-@in_workspace(FILES, "g++")
-def an_interrupted_tool_ends_the_run(workspace):
-    workspace.write("tools/gcc-4", "#!/bin/bash\nkill -INT $$\n")
-    output = workspace.run("all.qrex", status=1)
-    holds(output, "- base  [", "Interrupted while running gcc-4\n")
-    lacks(output, "- shape  [")
-    assert not workspace.path("out1.txt").exists() and not workspace.path("x64/Debug/base/compiler.rsp").exists()
-    translated = workspace.times("qrexsource/**/base/**/*.*")
-    workspace.path("tools/gcc-4").unlink()
-    workspace.run("all.qrex")
-    equal(workspace.shell(PROGRAM), RESULT)
-    lacks(" ".join(workspace.changed(translated, "qrexsource/**/base/*.h")), "numbers.h")
-
-
-@in_workspace(FILES, "g++", "clang++")
-def the_other_compilers_of_the_family(workspace):
-    workspace.run("all.qrex", "compiler=clang")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
-# --- Make files. `ar` does not take the switches of the generated rules; a relocatable link serves.
-
-MAKE = "make -f make_all_x64_Debug AR='g++ -r'"
-
-
-@in_workspace(FILES, "g++", "make")
-def make_builds_the_same_targets(workspace):
-    workspace.run("all.qrex", "mode=gen")
-    assert b"\r\n" in workspace.path("make_app_x64_Debug").read_bytes()
-    workspace.shell("make AR='g++ -r'")
-    equal(workspace.shell(PROGRAM), RESULT)
-    equal(sorted(workspace.times(LIBRARIES)),
-          ["out/lib/x64/Debug/app", "out/lib/x64/Debug/libbase.a", "out/lib/x64/Debug/libshape.so"])
-
-    objects = workspace.times(OBJECTS)
-    workspace.shell(MAKE)
-    equal(workspace.changed(objects, OBJECTS), [])
-    workspace.append("tree/shape/shape.h", "int More();\n")
-    workspace.shell(MAKE)
-    equal(workspace.changed(objects, OBJECTS), ["x64/Debug/app/app.o", "x64/Debug/shape/shape.o"])
-
-    workspace.shell("make dclean")
-    equal((workspace.times(OBJECTS), workspace.times("x64/**/*.d"), workspace.times(LIBRARIES)), ({}, {}, {}))
-    equal(workspace.times("qrexsource/**/*.cpp"), {})
-    workspace.shell(f"{MAKE} -j4")
-    equal(workspace.shell(PROGRAM), RESULT)
-
-
-@in_workspace(FILES, "g++", "make", "ccache")
-def make_takes_a_compiler_launcher(workspace):
-    workspace.run("all.qrex", "mode=gen")
-    # Without the cache that stands ahead of all compilers of the scripts: it counts what is compiled without the launcher as well.
-    environment = {"CCACHE_DIR": str(workspace.path("cache")), "PATH": f"{Path(workspace.binary).parent}:/usr/bin:/bin"}
-    workspace.shell(f"{MAKE} CXX='ccache g++'", **environment)
-    equal(workspace.shell(PROGRAM), RESULT)
-    workspace.shell("make dclean", **environment)
-    workspace.shell(f"{MAKE} CXX='ccache g++'", **environment)
-    holds(workspace.shell("ccache --print-stats", **environment), "direct_cache_hit\t5\n")
-
-
-run_tests([
-    builds_libraries_and_a_program_and_only_what_is_stale,
-    a_built_tree_moves_and_two_checkouts_are_equal,
-    messages_point_at_the_source,
-    link_errors_are_counted_and_leave_no_target,
-    a_program_without_libraries_is_linked,
-    what_switches_name_reaches_the_program,
-    failing_tools_are_counted_and_the_next_run_recovers,
-    missing_tools_are_named_and_counted,
-    captured_output_that_cannot_be_kept_is_an_error,
-    an_interrupted_tool_ends_the_run,
-    the_other_compilers_of_the_family,
-    make_builds_the_same_targets,
-    make_takes_a_compiler_launcher,
-])
+run_tests(globals())

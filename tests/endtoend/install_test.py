@@ -13,8 +13,7 @@ import tempfile
 import time
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, holds, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import equal, holds, lacks, need, run_tests
 
 INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex",
@@ -40,7 +39,7 @@ def installed(test):
 
 
 @installed
-def components(prefix, work):
+def test_components(prefix, work):
     equal([name for name in INSTALLED + RUNTIME if not (prefix / name).is_file()], [])
     logs = [path.read_text() for path in Path(sys.argv[1]).resolve().parent.glob("built/*/log")]
     equal((len(logs), [log for log in logs if "warning" in log]), (2, []))
@@ -57,7 +56,7 @@ def qrex(prefix, folder, *arguments, status=0):
 
 
 @installed
-def first_workspace(prefix, work):
+def test_first_workspace(prefix, work):
     """The steps of the page. The runtime comes built, for clang++ and make as well."""
     steps = re.search(r"\n\n((?:    .*\n)*    Qrex --init zoo\n(?:    .*\n)*)", PAGE.read_text()).group(1)
     environment = {"PATH": f"{prefix}/bin:/usr/bin:/bin"}
@@ -82,7 +81,7 @@ def first_workspace(prefix, work):
 
 
 @installed
-def moved(prefix, work):
+def test_moved(prefix, work):
     """A workspace is translated by a tool elsewhere, and the runtime is that of this tool, built or not."""
     qrex(prefix, work, "--init", "zoo")
     lacks((work / "zoo/settings.inc").read_text(), str(work.parent))
@@ -109,7 +108,7 @@ MODES = [("g++ -std=c++17", ""), ("g++ -std=c++20 -O2", ""), ("clang++ -std=c++1
 
 
 @installed
-def what_does_not_fit_does_not_compile(prefix, work):
+def test_what_does_not_fit_does_not_compile(prefix, work):
     def said(command):
         done = subprocess.run([*command.split(), "-fsyntax-only", "-x", "c++", "-I", prefix / "lib/qrex/include", "-"],
                               input="#include <Vesk/vxObject/Platform.h>\n", capture_output=True, text=True)
@@ -126,7 +125,7 @@ def what_does_not_fit_does_not_compile(prefix, work):
 
 
 @installed
-def manual_page(prefix, work):
+def test_manual_page(prefix, work):
     need("man")
     done = subprocess.run(["man", "-l", "--warnings=w", prefix / "share/man/man1/Qrex.1"], capture_output=True, text=True,
                           env={**os.environ, "MANWIDTH": "120", "LC_ALL": "C.UTF-8"})
@@ -134,7 +133,7 @@ def manual_page(prefix, work):
     holds(done.stdout, "Qrex --init NAME [FOLDER]", "modernCpp = false", "EXIT STATUS")
 
 
-def debian_package(binary):
+def test_debian_package(binary):
     need("cpack", "lintian", "dpkg-deb", "dpkg-shlibdeps")
     with tempfile.TemporaryDirectory(prefix="qrex-package-") as folder:
         subprocess.run(["cpack", "-G", "DEB", "-B", folder], cwd=os.path.dirname(os.path.abspath(binary)), check=True,
@@ -194,16 +193,16 @@ def completions(shell, setup, work):
 
 
 @installed
-def bash_completion(prefix, work):
+def test_bash_completion(prefix, work):
     need("bash")
     completions(["bash", "--norc", "--noprofile", "-i"], f"source {prefix}/share/bash-completion/completions/Qrex", work)
 
 
 @installed
-def zsh_completion(prefix, work):
+def test_zsh_completion(prefix, work):
     need("zsh")
     folder = prefix / "share/zsh/vendor-completions"
     completions(["zsh", "-f", "-i"], f"fpath=({folder} $fpath); autoload -U compinit; compinit -u -D", work)
 
 
-run_tests([components, first_workspace, moved, what_does_not_fit_does_not_compile, manual_page, debian_package, bash_completion, zsh_completion])
+run_tests(globals())

@@ -3,14 +3,11 @@
 says. Every keyword and directive of the tables has a section with an example."""
 
 import re
-import sys
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from runtime_fixture import PLAIN, link, write_library  # noqa: E402
-from workspace_fixture import SETTINGS, Workspace, equal, holds, need, run_tests  # noqa: E402
+from runtime_fixture import PLAIN, link, write_library
+from workspace_fixture import ROOT, SETTINGS, Workspace, equal, holds, need, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 PAGE = ROOT / "docs/language.md"
 PROJECT = """$TARGET_TYPE = "Console Application"
 $ROOT_TO_PROJDIR = "language"
@@ -38,7 +35,7 @@ def sections(text):
     return {heading: re.split(r"^##", body, flags=re.MULTILINE)[0] for heading, body in zip(parts[1::2], parts[2::2])}
 
 
-def every_word_of_the_tables_has_a_section(_):
+def test_every_word_of_the_tables_has_a_section(_):
     keywords = (ROOT / "src/translator/file/keywords.cpp").read_text()
     directives = (ROOT / "src/macro/directives.cpp").read_text()
     words = ["$" + word for word in re.findall(r'^    \{"(\w+)", ', keywords, re.MULTILINE)]
@@ -92,7 +89,7 @@ def translate(binary, examples):
     return workspace, workspace.path("output").read_text()
 
 
-def the_examples_print_what_the_page_says(binary):
+def test_the_examples_print_what_the_page_says(binary):
     need("g++")
     examples = Examples(with_python=True)
     workspace, output = translate(binary, examples)
@@ -112,4 +109,4 @@ def the_examples_print_what_the_page_says(binary):
         equal(workspace.shell("./all"), "".join(f"{name}\n{text}" for name, text in examples.printed))
 
 
-run_tests([every_word_of_the_tables_has_a_section, the_examples_print_what_the_page_says])
+run_tests(globals())

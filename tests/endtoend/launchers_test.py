@@ -2,18 +2,13 @@
 """Compilers behind a launcher: compiler caches and farms, by the real programs of this machine."""
 
 import contextlib
-import filecmp
 import json
 import os
-import shutil
 import socket
 import subprocess
-import sys
 import time
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, run_tests
 
 COUNT = 8
 PROJECT = """$TARGET_TYPE = "Console Application"
@@ -37,12 +32,8 @@ def files(switches="'-DNAME=\"two words\"'"):
     return made
 
 
-def clean(workspace):
-    workspace.shell("rm -rf x64 out qrexsource")
-
-
 def build(workspace, launcher, *arguments, **environment):
-    clean(workspace)
+    workspace.clean()
     log = workspace.run("all.qrex", f"launcher = {launcher}", "jobs=4", *arguments, "failOnErrors=true", **environment)
     equal(workspace.shell("./out/lib/x64/Debug/app"), "two words\n")
     return log
@@ -108,7 +99,7 @@ def test_distcc(workspace):
         equal(remote(), COUNT)
         # A source that does not compile there is an error as any, and counted once.
         workspace.append("tree/app/src/part1.cpp", "int part1() { return nothing; }\n")
-        clean(workspace)
+        workspace.clean()
         log_of_error = workspace.run("all.qrex", 'launcher="distcc"', "jobs=4", **farm)
         holds(log_of_error, "tree/app/src/part1.cpp(2) ...", "0 warnings, ")
         workspace.write("tree/app/src/part1.cpp", files()["tree/app/src/part1.cpp"])
@@ -144,13 +135,13 @@ def test_the_missing_one_is_named(workspace):
     workspace.write("tools/pass", '#!/bin/sh\nexec "$@"\n')
     for launcher, path, message in (("absent", "/usr/bin", "ERROR: absent was not found on PATH\n"),
                                     ("pass", "/nowhere", "ERROR: gcc-4 was not found on PATH, which pass is to run\n")):
-        clean(workspace)
+        workspace.clean()
         log = workspace.run("all.qrex", f'launcher = {{ "{launcher}" }}', f'PATH("x64") = {{ "tools" "{path}" }}')
         equal(log.count(message), COUNT)
         holds(log, f"0 warnings, {COUNT} errors")
     # One that dies leaves nothing that passes for an object.
     workspace.write("tools/pass", '#!/bin/sh\nwhile [ "$1" != -o ]; do shift; done\necho half > "$2"\nkill -9 $$\n')
-    clean(workspace)
+    workspace.clean()
     holds(workspace.run("all.qrex", 'launcher = "pass"', "commandFiles=false"), "ERROR: pass was ended by signal 9", f"{COUNT} errors")
     equal(workspace.times("x64/**/*.o"), {})
     # The linker has none.
@@ -169,32 +160,4 @@ def test_command_lines(workspace):
     equal(build(workspace, '""', "commandFiles=false").count("longer than the system's command lines"), 1)
 
 
-@in_workspace(files())
-def test_restored_outputs_count(workspace):
-    build(workspace, '""')
-    before = workspace.times("x64/**/*.o")
-    workspace.shell("find tree -type f -exec touch -d '1 minute' {} +")
-    workspace.run("all.qrex")
-    equal(workspace.changed(before, "x64/**/*.o"), [])
-
-
-def test_equal_in_every_folder(binary):
-    need("g++")
-    checkout = Path(__file__).parents[2]
-    for switches, variables in (("", {}), ('-g "-ffile-prefix-map=$(FOLDER)=."', {}), ("-g", {"PWD": "/proc/self/cwd"})):
-        made = []
-        with Workspace(binary, files(f"-DNAME=__FILE__ {switches}")) as one, \
-                Workspace(binary, files(f"-DNAME=__FILE__ {switches}")) as other:
-            for workspace in (one, other):
-                shutil.copytree(checkout / "examples" / "tour", workspace.path("tour"), ignore=lambda *_: ("out", "x64", "qrexsource"))
-                workspace.run(f'FOLDER="{workspace.folder}"', "all.qrex", **variables)
-                workspace.shell("cd tour && Qrex tour.qrex translateOnly=true "
-                                f"'virtualTree = {{ \"tree\" \"{checkout}/runtime\" }}'")
-                made.append({name: workspace.path(name).read_bytes() for name in workspace.times("**/*")
-                             if workspace.path(name).is_file() and not name.endswith((".guids", ".qrexdep"))})
-            assert len(made[0]) > 50 and "out/lib/x64/Debug/app" in made[0], sorted(made[0])
-            equal([name for name in made[0] if made[0][name] != made[1].get(name)], [])
-
-
-run_tests([test_ccache, test_distcc, test_sccache, test_icecc, test_the_missing_one_is_named, test_command_lines,
-           test_restored_outputs_count, test_equal_in_every_folder])
+run_tests(globals())

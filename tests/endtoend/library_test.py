@@ -2,12 +2,9 @@
 """Programs of the runtime's library alone: under sanitizers, in threads, in plug-ins, with the other byte order, without memory."""
 
 import re
-import sys
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from runtime_fixture import PLAIN, has_asio, link, run_tour, translate  # noqa: E402
-from workspace_fixture import Skipped, equal, holds, need, run_tests  # noqa: E402
+from runtime_fixture import PLAIN, has_asio, link, run_tour, translate
+from workspace_fixture import Skipped, equal, holds, need, run_tests
 
 # The tour and the scenarios without memory.
 ADDRESSES = "g++ -std=c++17 -g1 -fsanitize=address,undefined -fno-sanitize=bool -Wall -Werror -Wno-deprecated-declarations"
@@ -136,4 +133,4 @@ def test_modules(binary):
         equal(workspace.shell("./host"), "Twice Twice none\n")
 
 
-run_tests([test_undefined_behaviour, test_byte_order, test_threads, test_sockets, test_memory, test_modules])
+run_tests(globals())

@@ -2,13 +2,9 @@
 """Every message that the sources raise stands on the page of messages."""
 
 import re
-import sys
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, run_tests  # noqa: E402
+from workspace_fixture import ROOT, equal, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 RAISED = re.compile(r'(?:LexScannerException|\bFail|\bFailAt|\bComplain|WithToken)\((?:[\w.*]+, |std::string\(\w+\) \+ )?'
                     r'(?:PrintedElement\([^()]*\) \+ )?"((?:[^"\\]|\\.)*)"')
 TOLD = re.compile(r'(?:trace|TraceWriter\(\)|WriteToConsole\() ?(?:<< )?"((?:[^"\\]|\\.)*(?:[Ee]rror|ERROR|[Ww]arning|'
@@ -17,7 +13,7 @@ GENERIC = re.compile(r"^(Expected|Met EO[SF])\b|expected( *in \S+ directive)?$| 
                      r"|expected before |^[^A-Za-z]*$|^warning W$")
 
 
-def every_message_is_explained(_):
+def test_every_message_is_explained(_):
     page = re.sub(r"\s+", " ", (ROOT / "docs/messages.md").read_text())
     missing, seen = [], 0
     for path in sorted((ROOT / "src").rglob("*.cpp")):
@@ -33,4 +29,4 @@ def every_message_is_explained(_):
     assert seen > 150, f"only {seen} messages were found in the sources"
 
 
-run_tests([every_message_is_explained])
+run_tests(globals())

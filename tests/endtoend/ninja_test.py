@@ -4,38 +4,11 @@
 import json
 import os
 import shutil
-import sys
-import time
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import PROGRAM_FILES as FILES, SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 GEN = ["all.qrex", "mode=gen", "ninja=true"]
 NOTHING = "ninja: no work to do.\n"
-HEAD = '$TARGET_TYPE = "{}"\n$ROOT_TO_PROJDIR = "{}"\n@import "common.inc"\n'
-FILES = {
-    "all.qrex": SETTINGS,
-    "tree/all.qrws": '"all" { "lib" "dll" "app" }\n',
-    "tree/common.inc": 'config { "Debug|x64" "Release|x64" }\n+cpp { -std=c++17 -Wall -MMD -fPIC }\n',
-    "tree/app/src/app.qrpj": HEAD.format("Console Application", "app") + 'subproj { "dll" "lib" }\nqrex\n'
-                             '+cpp ("Debug") { -DKIND="a $ debug" }\n+cpp ("Release") { -O2 -DKIND="release" }\n'
-                             '+link { -Wl,-z,now }\n{ "src" { "*.h" "*.cpp" } }\n',
-    "tree/app/src/app.cpp": '@import "lib/lib.h"\n@import "dll/dll.h"\n@import "the kind.h"\n#include <cstdio>\n#define TEXT(x) #x\n'
-                            '#define TEXT_OF(x) TEXT(x)\n'
-                            'int main() { std::printf("%s %d %d\\n", TEXT_OF(KIND), lib(), dll()); }\n',
-    "tree/app/src/the kind.h": "int kind();\n",
-    "tree/app/src/the kind.cpp": '@import "the kind.h"\nint kind() { return 0; }\n',
-    "tree/lib/src/lib.qrpj": HEAD.format("Static Library", "lib") + 'qrex\n{ "*.h" "src" { "*.cpp" } }\n',
-    "tree/lib/lib.h": "int lib();\n",
-    "tree/lib/src/lib.cpp": '@import "lib/lib.h"\nint lib() { return 1; }\n',
-    "tree/dll/src/dll.qrpj": HEAD.format("Dynamic-Link Library", "dll") + 'qrex\n{ "*.h" "src" { "*.cpp" } }\n',
-    "tree/dll/dll.h": "int dll();\n",
-    "tree/dll/src/dll.cpp": '@import "dll/dll.h"\nint dll() { return 2; }\n',
-}
-
-
 def steps(text):
     """What ninja tells of its steps, without their numbers."""
     return sorted(line.partition("] ")[2] for line in text.splitlines() if line.startswith("["))
@@ -46,13 +19,8 @@ def settle(workspace, targets=""):
     equal(workspace.shell(f"ninja {targets}"), NOTHING)
 
 
-def edit(workspace, name, old, new):
-    time.sleep(0.01)  # a tick of the clock of stamps
-    workspace.replace(name, old, new)
-
-
 @in_workspace(FILES, "ninja", "g++")
-def builds_what_a_run_builds(workspace):
+def test_builds_what_a_run_builds(workspace):
     """Each edit makes the same objects and targets as a run does in a copy, and their bytes are the same."""
     workspace.run("all.qrex")
     ninja = workspace.path("ninja")
@@ -72,7 +40,7 @@ def builds_what_a_run_builds(workspace):
         before = {folder: {key: path.stat().st_mtime_ns for key, path in outputs(folder).items()}
                   for folder in (workspace.folder, ninja)}
         for folder in ("", "ninja/"):
-            edit(workspace, f"{folder}tree/{name}", old, new)
+            workspace.edit(f"{folder}tree/{name}", old, new)
         workspace.run("all.qrex")
         workspace.shell("cd ninja && ninja")
         made = {folder: sorted(key for key, path in outputs(folder).items() if before[folder][key] != path.stat().st_mtime_ns)
@@ -84,7 +52,7 @@ def builds_what_a_run_builds(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def names(workspace):
+def test_names(workspace):
     """Configurations and projects by their names; all commands can be told."""
     workspace.run(*GEN)
     holds(workspace.shell("ninja app-Release"), "Translating Release|x64", "Linking out/lib/x64/Release/app")
@@ -108,17 +76,17 @@ def names(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def follows_changes(workspace):
+def test_follows_changes(workspace):
     """The file is written anew by itself; a changed switch compiles what has it."""
     workspace.run(*GEN)
     settle(workspace)
     written = workspace.path("build.ninja").read_bytes()
-    edit(workspace, "tree/app/src/app.qrpj", '-DKIND="a $ debug"', '-DKIND="other"')
+    workspace.edit("tree/app/src/app.qrpj", '-DKIND="a $ debug"', '-DKIND="other"')
     text = workspace.shell("ninja")
     equal([step for step in steps(text) if "Compiling" in step],
           ["Compiling 'qrexsource/x64/Debug/app/src/the kind.cpp'", "Compiling qrexsource/x64/Debug/app/src/app.cpp"])
     equal(workspace.shell("ninja && out/lib/x64/Debug/app"), NOTHING + "other 1 2\n")
-    edit(workspace, "tree/app/src/app.qrpj", '-DKIND="other"', '-DKIND="a $ debug"')
+    workspace.edit("tree/app/src/app.qrpj", '-DKIND="other"', '-DKIND="a $ debug"')
     settle(workspace)
     equal(workspace.path("build.ninja").read_bytes(), written)
     workspace.write("tree/lib/src/new.cpp", "int fresh() { return 3; }\n")
@@ -132,26 +100,26 @@ def follows_changes(workspace):
     holds(workspace.shell("ninja"), "Looking at translations of Debug|x64")
     assert workspace.path("qrexsource/x64/Debug/lib/lib.h").exists()
     settle(workspace)
-    edit(workspace, "all.qrex", "compiler = gcc", "modernCpp = true compiler = gcc")
+    workspace.edit("all.qrex", "compiler = gcc", "modernCpp = true compiler = gcc")
     holds(workspace.shell("ninja"), "Writing build.ninja", "Translating Debug|x64")
     settle(workspace)
 
 
 @in_workspace(FILES, "ninja", "g++")
-def stops_at_errors(workspace):
+def test_stops_at_errors(workspace):
     workspace.run(*GEN)
-    edit(workspace, "tree/lib/src/lib.cpp", "return 1", "return one")
+    workspace.edit("tree/lib/src/lib.cpp", "return 1", "return one")
     text = workspace.shell("ninja -k 0", status=1, LC_ALL="C")
     holds(text, "FAILED: x64/Debug/lib/lib.o")
     holds(text, "'one' was not declared")
     holds(text, "ninja: build stopped")
     assert workspace.path("out/lib/x64/Debug/libdll.so").exists() and not workspace.path("out/lib/x64/Debug/app").exists()
-    edit(workspace, "tree/lib/src/lib.cpp", "return one", "return 1")
-    edit(workspace, "tree/lib/lib.h", "int lib();", "$class { };")
+    workspace.edit("tree/lib/src/lib.cpp", "return one", "return 1")
+    workspace.edit("tree/lib/lib.h", "int lib();", "$class { };")
     text = workspace.shell("ninja", status=1)
     holds(text, "FAILED: qrexsource/x64/Debug/.translated \n", "tree/lib/lib.h(1) : error : ", "ninja: build stopped")
     equal(workspace.shell("ninja", status=1).count("FAILED"), 1)
-    edit(workspace, "tree/lib/lib.h", "$class { };", "int lib();")
+    workspace.edit("tree/lib/lib.h", "$class { };", "int lib();")
     workspace.replace("tree/common.inc", "config", "confug")
     holds(workspace.shell("ninja", status=1), "FAILED: build.ninja", "tree/lib/src/lib.qrpj(3) : ")
     workspace.replace("tree/common.inc", "confug", "config")
@@ -159,7 +127,7 @@ def stops_at_errors(workspace):
 
 
 @in_workspace(FILES, "ninja", "g++")
-def translator_takes_its_time(workspace):
+def test_translator_takes_its_time(workspace):
     """Nothing is compiled ahead of what it includes. The tool is called as it was, also by a wrapper."""
     workspace.run(*GEN)
     workspace.write("slow", f'#!/bin/sh\nsleep 0.5\nexec "{workspace.binary}" "$@"\n')
@@ -169,7 +137,7 @@ def translator_takes_its_time(workspace):
     settle(workspace, "-j8")
 
 
-def clang_and_a_tree_elsewhere(binary):
+def test_clang_and_a_tree_elsewhere(binary):
     need("ninja", "clang++")
     with Workspace(binary, FILES) as workspace:
         workspace.write("a build/none", "")
@@ -180,24 +148,4 @@ def clang_and_a_tree_elsewhere(binary):
         equal(workspace.shell("cd 'a build' && ninja > log && ninja"), NOTHING)
 
 
-def tour(binary):
-    """The whole of an example by ninja alone. A touched header rebuilds what is of it."""
-    need("ninja", "g++")
-    with Workspace(binary, {}) as workspace:
-        shutil.copytree(ROOT / "examples/tour", workspace.folder, dirs_exist_ok=True,
-                        ignore=shutil.ignore_patterns("out", "qrexsource", "x64", "*.guids"))
-        workspace.replace("tour.qrex", "../../runtime", str(ROOT / "runtime"))
-        workspace.run("tour.qrex", "mode=gen", "ninja=true")
-        settle(workspace)
-        equal(workspace.shell("out/lib/x64/Debug/app"), (ROOT / "examples/tour/expected.txt").read_text())
-        time.sleep(0.01)
-        os.utime(workspace.path("tree/orders/api/kinds.h"))
-        equal(steps(workspace.shell("ninja")),
-              ["Compiling qrexsource/x64/Debug/app/src/app.cpp", "Compiling qrexsource/x64/Debug/orders/src/orders.cpp",
-               "Linking out/lib/x64/Debug/app", "Linking out/lib/x64/Debug/liborders.a", "Looking at translations of Debug|x64",
-               "Translating Debug|x64"])
-        equal(workspace.shell("ninja"), NOTHING)
-
-
-run_tests([builds_what_a_run_builds, names, follows_changes, stops_at_errors, translator_takes_its_time,
-           clang_and_a_tree_elsewhere, tour])
+run_tests(globals())

@@ -1,19 +1,11 @@
 #!/usr/bin/env python3
 """The status line of a build on a terminal, and messages of tools in colours there: seen through a pseudo terminal."""
 
-import fcntl
-import os
-import pty
 import re
 import signal
-import struct
-import subprocess
-import sys
-import termios
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+import terminal_fixture
+from workspace_fixture import SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
 
 # Prints a warning, an error and a note, each with the lines that compilers add, where the source asks for it.
 COMPILER = r"""#!/bin/bash
@@ -40,28 +32,8 @@ FILES = {
 STATUS = re.compile(r"\[\d+/\d+\] (\d+ running, )?\d+:\d\d(, [^\x1b\r]*)?")
 
 
-def on_terminal(workspace, *arguments, columns=80, until=None, kill=None, **environment):
-    """What a run writes to a terminal, and its exit status. `until`: bytes, behind which the signal `kill` is sent."""
-    terminal, its_end = pty.openpty()
-    fcntl.ioctl(its_end, termios.TIOCSWINSZ, struct.pack("HHHH", 24, columns, 0, 0))
-    variables = {name: value for name, value in {**os.environ, "TERM": "xterm", **environment}.items() if value is not None}
-    process = subprocess.Popen([workspace.binary, "all.qrex", *arguments], cwd=workspace.folder, stdin=its_end, stdout=its_end,
-                               stderr=its_end, env=variables)
-    os.close(its_end)
-    output = b""
-    while True:
-        try:
-            part = os.read(terminal, 65536)
-        except OSError:  # the last writer has closed it
-            break
-        if not part:
-            break
-        output += part
-        if until and until in output:
-            os.kill(process.pid, kill)
-            until = None
-    os.close(terminal)
-    return output.decode().replace("\r\n", "\n"), process.wait(timeout=60)
+def on_terminal(workspace, *arguments, **options):
+    return terminal_fixture.on_terminal([workspace.binary, "all.qrex", *arguments], workspace.folder, **options)
 
 
 def shown(output):
@@ -81,23 +53,15 @@ def shown(output):
     return "\n".join(lines)
 
 
-def comparable(text):
-    return re.sub(r"\.{3,} *[\d.]+ ms|    hint: .*\n|argv\[\d\] = .*\n", "", text)
-
-
 def statuses(output):
     return [match.group() for match in STATUS.finditer(output)]
-
-
-def fresh(workspace):
-    workspace.shell("rm -rf x64 out qrexsource")
 
 
 @in_workspace(FILES)
 def test_line_is_shown_and_gone(workspace):
     piped = workspace.run("all.qrex", "jobs=2")
     lacks(piped, "\x1b")
-    fresh(workspace)
+    workspace.clean()
     output, status = on_terminal(workspace, "jobs=2")
     equal(status, 0)
     equal(comparable(shown(output)), comparable(piped))  # what the linker printed stands whole in it, too
@@ -114,10 +78,10 @@ def test_terminals_that_take_less(workspace):
     workspace.write("tools/g++", LINKER.replace("sleep 2.4; ", ""))
     piped = comparable(workspace.run("all.qrex"))
     for kind in ("dumb", "", None):
-        fresh(workspace)
+        workspace.clean()
         equal(comparable(on_terminal(workspace, TERM=kind)[0]), piped)
     for columns in (4, 16, 34):
-        fresh(workspace)
+        workspace.clean()
         output = on_terminal(workspace, columns=columns)[0]
         drawn = re.findall(r"(\[\d[^\r\n\x1b]*)(?=\r\x1b\[K)", output)
         assert all(len(line) < columns for line in drawn) and bool(drawn) == (columns > 5), output
@@ -129,7 +93,7 @@ def test_messages_of_tools_are_coloured(workspace):
     piped = workspace.run("all.qrex")
     holds(piped, "1 warnings, 1 errors")
     for environment, is_coloured in (({}, True), ({"NO_COLOR": ""}, True), ({"NO_COLOR": "1"}, False)):
-        fresh(workspace)
+        workspace.clean()
         output = on_terminal(workspace, **environment)[0]
         assert statuses(output)
         if is_coloured:
@@ -143,12 +107,11 @@ def test_messages_of_tools_are_coloured(workspace):
 @in_workspace(FILES)
 def test_signals_leave_no_line(workspace):
     for number, status in ((signal.SIGTERM, -signal.SIGTERM), (signal.SIGHUP, -signal.SIGHUP)):
-        fresh(workspace)
+        workspace.clean()
         output, ended = on_terminal(workspace, "jobs=2", until=b"slow.cpp", kill=number)
         equal(ended, status)
         assert shown(output).endswith("\n"), shown(output)
         workspace.run("all.qrex", "jobs=2")  # which waits for the ends of the tools
 
 
-run_tests([test_line_is_shown_and_gone, test_terminals_that_take_less, test_messages_of_tools_are_coloured,
-           test_signals_leave_no_line])
+run_tests(globals())

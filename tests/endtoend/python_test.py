@@ -2,11 +2,9 @@
 """Runs of the tool that use Python, and runs that must not need it."""
 
 import re
-import sys
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, run_tests  # noqa: E402
+from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, run_tests
 
 DOCS = Path(__file__).parents[2] / "docs/python.md"
 PROJECT = """$TARGET_TYPE = "Application"
@@ -40,7 +38,7 @@ def need_python(binary):
         raise
 
 
-def a_missing_library_is_named(binary):
+def test_a_missing_library_is_named(binary):
     python = {"status": 1, "QREX_PYTHON": MISSING}
     output, _ = translate(binary, {"t.py": "@runpython { x = 1 }\n"}, **python)
     assert re.search(r"app/src/t\.py\(1\) : error : Python initialisation error: Python 2\.7 can't be loaded; tried\n +"
@@ -50,12 +48,12 @@ def a_missing_library_is_named(binary):
     holds(output, "app/src/t.py(2)")
 
 
-def an_empty_block_needs_no_python(binary):
+def test_an_empty_block_needs_no_python(binary):
     _, generated = translate(binary, {"t.py": "@runpython { }\ntext\n"}, QREX_PYTHON=MISSING)
     equal(generated, {"t.py": "text\n"})
 
 
-def what_would_end_the_tool_is_an_error(binary):
+def test_what_would_end_the_tool_is_an_error(binary):
     need_python(binary)
     for call in ("os._exit(0)", "posix._exit(0)", "os.execl('/bin/true', 'true')"):
         output, generated = translate(binary, {"t.py": f"@runpython {{ import os, posix; {call} }}\n"}, status=1)
@@ -66,14 +64,14 @@ def what_would_end_the_tool_is_an_error(binary):
     equal(generated, {"t.py": "text\n"})
 
 
-def the_folder_of_the_run_stays(binary):
+def test_the_folder_of_the_run_stays(binary):
     need_python(binary)
     _, generated = translate(binary, {"t.py": "@runpython { import os; os.chdir('/') }\n@defpython go = os.chdir('/usr') or 1\ngo\n",
                                       "u.py": "text\n"})
     equal(generated, {"t.py": "1\n", "u.py": "text\n"})
 
 
-def the_documented_example(binary):
+def test_the_documented_example(binary):
     need_python(binary)
     blocks = re.findall(r"(?m)(?:^    .*\n)+", DOCS.read_text())
     table, header, expected = (re.sub(r"(?m)^    ", "", block) for block in blocks)
@@ -81,19 +79,11 @@ def the_documented_example(binary):
     holds(re.sub(r"(?m)^ +\n", "", generated["commands.h"]), expected)  # without the lines that @for leaves blank
 
 
-def prints_keep_their_order(binary):
+def test_prints_keep_their_order(binary):
     need_python(binary)
     output, _ = translate(binary, {"t.py": '@print("a")\n@runpython\n{\n    print "b",\n    import sys\n'
                                            '    sys.__stdout__.write("c")\n}\n@print("d")\n'})
     holds(output, '"a"bc"d"')
 
 
-def exit_is_an_error(binary):
-    need_python(binary)
-    output, generated = translate(binary, {"t.py": "@runpython\n{\n    import sys\n    sys.exit(0)\n}\n"}, status=1)
-    holds(output, "RunPython error: SystemExit: 0\n")
-    equal(generated, {})
-
-
-run_tests([a_missing_library_is_named, an_empty_block_needs_no_python, the_documented_example, prints_keep_their_order,
-           exit_is_an_error, what_would_end_the_tool_is_an_error, the_folder_of_the_run_stays])
+run_tests(globals())

@@ -6,13 +6,11 @@ import os
 import re
 import signal
 import subprocess
-import sys
 import time
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from browser_fixture import Browser, with_selenium  # noqa: E402
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, run_tests  # noqa: E402
+from browser_fixture import Browser, with_selenium
+from workspace_fixture import ROOT, SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
 
 with_selenium()
 
@@ -74,9 +72,9 @@ def compiled(workspace):
 @in_workspace(FILES)
 def test_trace_tells_what_ran_when_and_why(workspace):
     piped = workspace.run("all.qrex")
-    workspace.shell("rm -rf x64 out qrexsource")
+    workspace.clean()
     log = workspace.run("all.qrex", TRACE)
-    equal(*(re.sub(r"\.{3,} *[\d.]+ ms|argv.*\n", "", text) for text in (log, piped)))
+    equal(comparable(log), comparable(piped))
     found = spans(workspace)
     one, two = (found[f"core/src/{name}.cpp", "compiler"] for name in ("one", "two"))
     assert 300 <= one[1] - one[0] < 600 and two[0] < one[1] and {one[2], two[2]} == {"slot 1", "slot 2"}, found
@@ -117,15 +115,6 @@ def test_trace_of_a_run_that_fails(workspace):
     equal((errors[broken]["path"], errors[broken]["lines"]), ("app/src/app.cpp", [[1, "$class+ Broken {"]]))
     workspace.run("all.qrex", REPORT, status=1)
     equal(page_data(workspace)["completed"], False)
-
-
-@in_workspace(FILES)
-def test_files_that_cannot_be_written(workspace):
-    workspace.write("file", "")
-    holds(workspace.run("all.qrex", 'buildTrace="file/trace.json"', status=1),
-          "Error: File error (file/trace.json)", "Completed with 1 warnings")
-    lacks(workspace.run("all.qrex", TRACE, "mode=clean"), "trace.json\n")
-    assert not workspace.path("out/trace.json").exists()
 
 
 def shown_steps(browser):
@@ -231,7 +220,6 @@ def look_at_narrow_page(browser):
     browser.resize(1280, 900)
 
 
-ROOT = Path(__file__).resolve().parents[2]
 MODELS = r'''@import "Vesk/vxObject/IObject.h"
 @print("printed ")
 $interface+ IShape : vesk::IObject { float64 Area(int32 places = 2) const; };
@@ -335,7 +323,6 @@ def test_page_of_files_with_errors(workspace):
     """In a build, what the page collects is not told twice; files behind the error are in it as well."""
     workspace.write("tree/app/b.h", '@import "app/a.h"\n@fail("no <b>")\n')
     workspace.write("tree/app/src/m0.cpp", '@import "Vesk/vxObject/IObject.h"\n$struct Behind { $int32 x; };\n')
-    comparable = lambda text: re.sub(r"\.{3,} *[\d.]+ ms|argv.*\n", "", text)
     plain = workspace.run("all.qrex", status=1)
     workspace.shell("rm -rf qrexsource out")
     equal(comparable(workspace.run("all.qrex", REPORT, status=1)), comparable(plain))
@@ -355,5 +342,4 @@ def test_page_of_files_with_errors(workspace):
         holds(workspace.run("--report", *arguments, status=1), told)
 
 
-run_tests([test_page_without_a_build, test_page_of_files_with_errors, test_trace_tells_what_ran_when_and_why, test_trace_of_a_run_that_fails, test_files_that_cannot_be_written,
-           test_page_in_a_browser])
+run_tests(globals())

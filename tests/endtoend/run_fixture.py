@@ -2,15 +2,12 @@
 
 import functools
 import os
-import resource
 import shutil
 import stat
-import struct
 import subprocess
 import sys
 import tempfile
 import time
-import zlib
 
 from workspace_fixture import run_tests
 
@@ -72,13 +69,9 @@ def write_tree(changes={}, age=3600):
             os.utime(os.path.join(folder, name), (then, then))
 
 
-def run(*arguments, status=0, limit=None, **options):
-    """Runs the tool; what it printed. `limit`: the size in bytes at which the writing of a file fails."""
-    def prepare():
-        if limit is not None:
-            resource.setrlimit(resource.RLIMIT_FSIZE, (limit, limit))
-    done = subprocess.run([BINARY, *(arguments or ['main.qrex'])], stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
-                          timeout=60, preexec_fn=prepare, restore_signals=limit is None, **options)
+def run(*arguments, status=0):
+    """Runs the tool; what it printed."""
+    done = subprocess.run([BINARY, *(arguments or ['main.qrex'])], stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=60)
     text = done.stdout.decode(errors='replace')
     assert done.returncode == status, f'status {done.returncode}, not {status}, of {arguments}:\n{text}'
     return text
@@ -119,31 +112,6 @@ def edit(path, content=None):
     write(path, read(path) + b'// edited\n' if content is None else content)
 
 
-def dependencies():
-    """The dependency file: per path its imports, translation time and declaration flag; the two registries."""
-    data = read(DEPENDENCIES)
-    magic, crc, size = struct.unpack('<IIq', data[:16])
-    payload = data[16:]
-    expect(magic == MAGIC and size == len(payload) and crc == zlib.crc32(payload), 'damaged dependency file')
-    at = 0
-
-    def take(n):
-        nonlocal at
-        at += n
-        return payload[at - n:at]
-
-    def string():
-        return take(take(1)[0]).decode()  # all that is tested here is shorter than 128
-    files = {}
-    while path := string():
-        when, count = struct.unpack('<qI', take(12))
-        imports = [string() for _ in range(count)]
-        files[path] = (imports, when, take(1)[0])
-    registries = [{string(): [string() for _ in range(take(1)[0])] for _ in range(take(1)[0])} for _ in range(2)]
-    expect(at == len(payload), 'bytes behind the payload')
-    return files, registries
-
-
 def in_folder(test):
     """The test as a function that works in a temporary folder."""
     @functools.wraps(test)
@@ -160,4 +128,4 @@ def in_folder(test):
 
 def run_named(tests):
     """Runs the functions of a module whose names begin with test_."""
-    run_tests([in_folder(test) for name, test in list(tests.items()) if name.startswith('test_')])
+    run_tests({name: in_folder(test) for name, test in tests.items() if name.startswith('test_')})

@@ -4,11 +4,9 @@ import shutil
 import subprocess
 from pathlib import Path
 
-from workspace_fixture import CACHE, SETTINGS, Workspace, equal, holds, lacks, need
+from workspace_fixture import CACHE, ROOT, SETTINGS, Workspace, equal, holds, lacks, need
 
-HERE = Path(__file__).resolve().parent
-ROOT = HERE.parent.parent
-TREE = HERE / "runtime" / "tree"
+TREE = ROOT / "tests/endtoend/runtime/tree"
 TOUR = ROOT / "examples" / "tour"
 # Tests that need no other command use this one: the first of them leaves the library's object in the cache.
 PLAIN = "g++ -std=c++17 -Wall -Werror -fPIC -fno-gnu-unique"

@@ -5,13 +5,10 @@ the same for the tour. clang++ compiles the same text without a complaint."""
 import os
 import re
 import subprocess
-import sys
 from concurrent.futures import ThreadPoolExecutor
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from runtime_fixture import TOUR, TREE, build, has_asio, run_tour, translate  # noqa: E402
-from workspace_fixture import Skipped, equal, holds, need, run_tests  # noqa: E402
+from runtime_fixture import TOUR, TREE, build, has_asio, run_tour, translate
+from workspace_fixture import Skipped, equal, holds, need, run_tests
 
 
 def compile_with_clang(workspace, projects, flags):
@@ -115,4 +112,4 @@ def test_headers(binary):
             equal("".join(pool.map(errors_of, headers)), "")
 
 
-run_tests([test_every_kind, test_compilable_text, test_tour, test_libcxx, test_headers])
+run_tests(globals())

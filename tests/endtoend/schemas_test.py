@@ -2,15 +2,9 @@
 """The key schemaLock: releases that are recorded stay as they are, whatever a run translates of them."""
 
 import shutil
-import subprocess
-import sys
-import time
-from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, need, run_tests  # noqa: E402
+from workspace_fixture import ROOT, SETTINGS, equal, holds, in_workspace, lacks, run_tests
 
-ROOT = Path(__file__).resolve().parents[2]
 LOCK = "kept/all.schemas"
 HEAD = "# Releases of models whose archives can be read. Kept by Qrex, to be committed.\n"
 IMPORT = '@import "Vesk/vxObject/IObject.h"\n'
@@ -62,13 +56,8 @@ def lock(workspace):
     return workspace.path(LOCK).read_text()
 
 
-def edit(workspace, name, old, new):
-    time.sleep(0.02)
-    workspace.replace(f"tree/app/src/{name}", old, new)
-
-
 @in_workspace(KEYED)
-def what_is_new_is_recorded(workspace):
+def test_what_is_new_is_recorded(workspace):
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES)
     before = workspace.times("**/*")
@@ -79,23 +68,23 @@ def what_is_new_is_recorded(workspace):
     lacks(str(workspace.changed(before, "**/*")), LOCK)
     assert not list(workspace.folder.glob("qrexsource/**/*.qrexschemas")) and workspace.path(LOCK).exists()
     workspace.run("all.qrex")
-    edit(workspace, "kinds.h", "low, high", "low, high, last")
-    edit(workspace, "kinds.h", "int32 count;", "int32 count; bool;")
-    edit(workspace, "other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
+    workspace.edit("tree/app/src/kinds.h", "low, high", "low, high, last")
+    workspace.edit("tree/app/src/kinds.h", "int32 count;", "int32 count; bool;")
+    workspace.edit("tree/app/src/other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES.replace("high:1", "high:1 last:2").replace("count:int32", "count:int32 :bool").replace(
         "Other 2 = +a:int32\n", "Other 2 = +a:int32\napp Other 10 = +b:int32\n"))
     workspace.write("tree/app/src/new.h", IMPORT + OTHER.replace("Other", "New"))
     workspace.replace("tree/app/src/app.qrpj", '"other.h"', '"other.h" "new.h"')
-    edit(workspace, "app.cpp", "int main", '@import "new.h"\nint main')
+    workspace.edit("tree/app/src/app.cpp", "int main", '@import "new.h"\nint main')
     workspace.run("all.qrex")
     holds(lock(workspace), "app New 2 = +a:int32\napp Note 1 ")
 
 
 @in_workspace(FILES)
-def without_the_key(workspace):
+def test_without_the_key(workspace):
     """Nothing is read or written; a target that is too low is a warning with compilableText alone."""
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 9)")
+    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 9)")
     workspace.write(LOCK, "<<<<<<< HEAD\n")
     lacks(workspace.run("all.qrex"), "release 9")
     holds(workspace.run("all.qrex", "rebuildAll=true", "compilableText=true"), "app.cpp(3) : warning W1020 : ")
@@ -104,7 +93,7 @@ def without_the_key(workspace):
 
 
 @in_workspace(KEYED)
-def what_is_recorded_stays(workspace):
+def test_what_is_recorded_stays(workspace):
     """Each change is an error at the $schema, in this run and the next; taken back, all is well."""
     workspace.run("all.qrex")
     next_release = "and what is new as release 11"
@@ -124,34 +113,34 @@ def what_is_recorded_stays(workspace):
             ("kinds.h", "xvector<Kind> kinds;", "xvector<Kind> kinds; bool b;", "note.h", ["stores n::Part", "or give it a $schema whose first release has them"]),
             ("kinds.h", "xvector<Kind> kinds;", "xvector<Kind> kinds; bool b; $schema { 1: +b 11: +kinds }", "kinds.h",
              ['The first release of $model n::Part is "+b:bool"', '"+kinds:xvector<n::Kind>"'])]:
-        edit(workspace, name, old, new)
+        workspace.edit(f"tree/app/src/{name}", old, new)
         line = at if isinstance(at, int) else places.get(at, 5)
         file = name if isinstance(at, int) else at
         for lines in ([], [], ["keepGoing=true"], []):
             output = workspace.run("all.qrex", *lines, status=1)
             holds(output, f"tree/app/src/{file}({line}) : error : ", *told)
             equal(lock(workspace), HEAD + LINES)
-        edit(workspace, name, new, old)
+        workspace.edit(f"tree/app/src/{name}", new, old)
         workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES)
-    edit(workspace, "kinds.h", "xvector<Kind> kinds;", "xvector<Kind> kinds; bool b; $schema { 1: +kinds 11: +b }")
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 11)")
+    workspace.edit("tree/app/src/kinds.h", "xvector<Kind> kinds;", "xvector<Kind> kinds; bool b; $schema { 1: +kinds 11: +b }")
+    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 11)")
     workspace.run("all.qrex")
     holds(lock(workspace), "app n::Part 1 = +kinds:xvector<n::Kind>\napp n::Part 11 = +b:bool\n")
 
 
 @in_workspace(KEYED)
-def partial_runs(workspace):
+def test_partial_runs(workspace):
     """What a run does not see stays recorded, and what was changed in the lock itself is seen though no source is stale."""
     workspace.run("all.qrex")
     workspace.path(LOCK).unlink()
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES)
-    edit(workspace, "other.h", "$schema { 2: +a }", "$schema { 2: +a }\n@fail(\"no\")\n")
-    edit(workspace, "kinds.h", "low, high", "low, high, last")
+    workspace.edit("tree/app/src/other.h", "$schema { 2: +a }", "$schema { 2: +a }\n@fail(\"no\")\n")
+    workspace.edit("tree/app/src/kinds.h", "low, high", "low, high, last")
     holds(workspace.run("all.qrex", "keepGoing=true", status=1), "other.h(6)")
     equal(lock(workspace), HEAD + LINES.replace("high:1", "high:1 last:2"))
-    edit(workspace, "other.h", "\n@fail(\"no\")\n", "")
+    workspace.edit("tree/app/src/other.h", "\n@fail(\"no\")\n", "")
     workspace.run("all.qrex")
     before = workspace.times("qrexsource/**/*.[hc]*")
     workspace.replace(LOCK, "Other 2 = +a:int32", "Other 2 = +a:int64")
@@ -164,15 +153,15 @@ def partial_runs(workspace):
     holds(workspace.run("all.qrex"), f"{LOCK}(8) : warning : Lost is no model with a $schema of project app any more")
     lacks(workspace.run("all.qrex"), "Lost")
     holds(lock(workspace), "app Lost 3 = +x:int32\n", "lib Foreign 1 = +x:bool\n")
-    edit(workspace, "app.cpp", "int main", "int other();\nint main")
+    workspace.edit("tree/app/src/app.cpp", "int main", "int other();\nint main")
     lacks(workspace.run("all.qrex", "$COMPILE_FILE_PATH=\"" + str(workspace.path("tree/app/src/app.cpp")) + '"', "mode=compile"), "Lost")
     holds(workspace.run("all.qrex", "rebuildAll=true"), f"{LOCK}(2) : warning : Lost is no model")
 
 
 @in_workspace(KEYED)
-def a_lock_that_is_none(workspace):
+def test_a_lock_that_is_none(workspace):
     workspace.run("all.qrex")
-    edit(workspace, "other.h", "int32 a;", "int32 a; ")
+    workspace.edit("tree/app/src/other.h", "int32 a;", "int32 a; ")
     for text, line, told in [
             (HEAD + LINES + "app Other 2 = +a:int64\n", 8, f"Release 2 of Other stands in {LOCK}(4) in another way: where two changes have added it"),
             (HEAD + LINES + "app n::Kind enum = low:0\n", 8, "n::Kind stands in"),
@@ -195,7 +184,7 @@ def a_lock_that_is_none(workspace):
     workspace.path(LOCK).unlink()
     shutil.rmtree(workspace.path("kept"))
     workspace.write("kept", "")
-    edit(workspace, "other.h", "int32 a; ", "int32 a;")
+    workspace.edit("tree/app/src/other.h", "int32 a; ", "int32 a;")
     for _ in range(2):  # what could not be recorded is not taken for done
         holds(workspace.run("all.qrex", status=1), "kept/all.schemas")
     workspace.path("kept").unlink()
@@ -204,46 +193,16 @@ def a_lock_that_is_none(workspace):
 
 
 @in_workspace(KEYED)
-def the_release_of_the_target(workspace):
+def test_the_release_of_the_target(workspace):
     workspace.run("all.qrex")
-    edit(workspace, "other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 12: +b }")  # app.cpp is not stale by it
+    workspace.edit("tree/app/src/other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 12: +b }")  # app.cpp is not stale by it
     told = "app.cpp(3) : error : The target of the project writes archives of release 10, and a $schema of it has release 12"
     for lines in ([], [], ["keepGoing=true"], ["rebuildAll=true"], []):
         holds(workspace.run("all.qrex", *lines, status=1), told)
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 12)")
+    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 12)")
     lacks(workspace.run("all.qrex"), "error")
-    edit(workspace, "app.cpp", "(app, 12)", "(app, 11)")
+    workspace.edit("tree/app/src/app.cpp", "(app, 12)", "(app, 11)")
     holds(workspace.run("all.qrex", status=1), "define the target with 12")
 
 
-@in_workspace(KEYED)
-def branches_are_merged(workspace):
-    """Git merges what two branches record of different models; of one release it leaves a conflict, which is told."""
-    need("git")
-    git = "git -c user.name=a -c user.email=a@example.org "
-    workspace.write(".gitignore", "qrexsource/\nout/\n")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} init -q -b one && {git} add . && {git} commit -qm base && {git} checkout -qb two")
-    edit(workspace, "kinds.h", "low, high", "low, high, last")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam two && {git} checkout -q one")
-    edit(workspace, "other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam one && {git} merge -q two -m both")
-    workspace.run("all.qrex")
-    holds(lock(workspace), "app Other 10 = +b:int32\n", "low:0 high:1 last:2")
-    equal(workspace.shell(f"{git} status --porcelain"), "")
-    workspace.shell(f"{git} checkout -qb three")
-    edit(workspace, "other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; bool c;\n    $schema { 2: +a 10: +b 11: +c")
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 11)")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam three && {git} checkout -q one")
-    edit(workspace, "other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; int8 d;\n    $schema { 2: +a 10: +b 11: +d")
-    edit(workspace, "app.cpp", "(app, 10)", "(app, 11)")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam four; {git} merge -q three -m all", status=1)
-    holds(workspace.run("all.qrex", status=1), f"{LOCK}(", ") : error : A merge has left a conflict here")
-
-
-run_tests([what_is_new_is_recorded, without_the_key, what_is_recorded_stays, partial_runs, a_lock_that_is_none, the_release_of_the_target,
-           branches_are_merged])
+run_tests(globals())

@@ -3,11 +3,9 @@
 
 import os
 import re
-import sys
 from pathlib import Path
 
-sys.path.insert(0, str(Path(__file__).parent))
-from workspace_fixture import equal, holds, in_workspace, run_tests  # noqa: E402
+from workspace_fixture import equal, holds, in_workspace, run_tests
 
 PAGE = Path(__file__).resolve().parents[2] / "docs/tutorial.md"
 FILE = re.compile(r"(?:^|.*\. )`([^`]+)`:$")  # ahead of a block: its name
@@ -54,11 +52,11 @@ def follow(workspace, text):
 
 
 @in_workspace({}, "g++", "make")
-def the_tutorial(workspace):
+def test_the_tutorial(workspace):
     text = PAGE.read_text()
     files, typed = follow(workspace, text)
     equal(files, len(re.findall(r"`:$", text, flags=re.MULTILINE)))
     equal(typed, len(re.findall(r"^    \$ ", text, flags=re.MULTILINE)))
 
 
-run_tests([the_tutorial])
+run_tests(globals())

@@ -2,14 +2,17 @@
 
 import functools
 import os
+import re
 import shutil
 import stat
 import subprocess
 import sys
 import tempfile
+import time
 import traceback
 from pathlib import Path
 
+ROOT = Path(__file__).resolve().parents[2]
 # A configuration for the tools of the gcc family; what is added behind it overrides.
 SETTINGS = """virtualTree = { "tree" }
 $EXPORT_LIB = "out/lib"
@@ -32,6 +35,28 @@ if os.path.isdir(CACHE):
 
 # The words of `compiler`, in their order.
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
+
+# A program, a dynamic and a static library, which print "a $ debug 1 2".
+PROJECT_HEAD = '$TARGET_TYPE = "{}"\n$ROOT_TO_PROJDIR = "{}"\n@import "common.inc"\n'
+PROGRAM_FILES = {
+    "all.qrex": SETTINGS,
+    "tree/all.qrws": '"all" { "lib" "dll" "app" }\n',
+    "tree/common.inc": 'config { "Debug|x64" "Release|x64" }\n+cpp { -std=c++17 -Wall -MMD -fPIC }\n',
+    "tree/app/src/app.qrpj": PROJECT_HEAD.format("Console Application", "app") + 'subproj { "dll" "lib" }\nqrex\n'
+                             '+cpp ("Debug") { -DKIND="a $ debug" }\n+cpp ("Release") { -O2 -DKIND="release" }\n'
+                             '+link { -Wl,-z,now }\n{ "src" { "*.h" "*.cpp" } }\n',
+    "tree/app/src/app.cpp": '@import "lib/lib.h"\n@import "dll/dll.h"\n@import "the kind.h"\n#include <cstdio>\n#define TEXT(x) #x\n'
+                            '#define TEXT_OF(x) TEXT(x)\n'
+                            'int main() { std::printf("%s %d %d\\n", TEXT_OF(KIND), lib(), dll()); }\n',
+    "tree/app/src/the kind.h": "int kind();\n",
+    "tree/app/src/the kind.cpp": '@import "the kind.h"\nint kind() { return 0; }\n',
+    "tree/lib/src/lib.qrpj": PROJECT_HEAD.format("Static Library", "lib") + 'qrex\n{ "*.h" "src" { "*.cpp" } }\n',
+    "tree/lib/lib.h": "int lib();\n",
+    "tree/lib/src/lib.cpp": '@import "lib/lib.h"\nint lib() { return 1; }\n',
+    "tree/dll/src/dll.qrpj": PROJECT_HEAD.format("Dynamic-Link Library", "dll") + 'qrex\n{ "*.h" "src" { "*.cpp" } }\n',
+    "tree/dll/dll.h": "int dll();\n",
+    "tree/dll/src/dll.cpp": '@import "dll/dll.h"\nint dll() { return 2; }\n',
+}
 
 
 class Skipped(Exception):
@@ -70,6 +95,15 @@ class Workspace:
         assert old in text, f"{old!r} does not stand in {name}"
         self.path(name).write_text(text.replace(old, new))
 
+    def edit(self, name, old, new):
+        """Replaces a text, later than all that was written before."""
+        time.sleep(0.02)
+        self.replace(name, old, new)
+
+    def clean(self):
+        """Removes all that builds have made."""
+        self.shell("rm -rf x64 out qrexsource")
+
     def run(self, *arguments, status=0, **environment):
         """Runs the tool; its standard output. Fails on another exit status."""
         done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900,
@@ -93,6 +127,11 @@ class Workspace:
     def changed(self, before, pattern):
         """The files of the pattern that are new or younger than in `before`."""
         return sorted(name for name, time in self.times(pattern).items() if before.get(name) != time)
+
+
+def comparable(log):
+    """A log without what differs from run to run."""
+    return re.sub(r"\.{3,} *[\d.]+ ms|    hint: .*\n|argv\[\d+\] = .*\n", "", log)
 
 
 def equal(got, expected):
@@ -131,12 +170,15 @@ def in_workspace(files, *tools):
 
 
 def run_tests(tests):
-    """Calls with the binary each test, or those that the command line names; prints failures, skips and the closing line; ends
-    the process."""
+    """Calls with the binary each test, of a module's names those that begin with test_, or those that the command line names
+    (numbers are a script's own); prints failures, skips and the closing line; ends the process."""
+    if isinstance(tests, dict):
+        tests = [test for name, test in tests.items() if name.startswith("test_")]
     binary = os.path.abspath(sys.argv[1])
+    names = [argument for argument in sys.argv[2:] if not argument.isdigit()]
     passed = failed = skipped = 0
     for test in tests:
-        if sys.argv[2:] and test.__name__ not in sys.argv[2:]:
+        if names and test.__name__ not in names:
             continue
         try:
             test(binary)

@@ -131,17 +131,6 @@ TEST_F(NinjaFileTest, NoRule) {
   EXPECT_FALSE(FileExists("build.ninja"));
 }
 
-TEST_F(NinjaFileTest, OnlyIfAsked) {
-  settings.ninja = false;
-  WriteProject("app", "{ }");
-  Generate("app");
-  EXPECT_FALSE(FileExists("build.ninja"));
-  settings.ninja = true;
-  settings.compiler = CompilerKind::vc14;
-  Generate("app");
-  EXPECT_FALSE(FileExists("build.ninja"));
-}
-
 }  // namespace
 
 }  // namespace qrex

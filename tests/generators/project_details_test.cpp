@@ -33,10 +33,6 @@ TEST_F(ProjectDetailsTest, MissingDependency) {
   EXPECT_EQ(trace, "Writing app.dsp\nWriting new.dsp\n" + missing + "Writing all.dsw\n");
   AssertLacks("all.dsw", "Project Dependency");
 
-  LoadAndGenerate(CompilerKind::vc8);
-  EXPECT_EQ(trace, noLibrary + noLibrary + "Writing app.vcproj\nWriting new.vcproj\n" + missing + "Writing all.sln\n");
-  AssertHolds("all.sln", "\tProjectSection(ProjectDependencies) = postProject\n\tEndProjectSection\nEndProject\n");
-
   LoadAndGenerate(CompilerKind::vc10);
   EXPECT_EQ(trace, noLibrary + noLibrary + missing +
                        "Writing app.vcxproj\nWriting app.vcxproj.filters\nWriting new.vcxproj\n"
@@ -59,35 +55,10 @@ TEST_F(ProjectDetailsTest, PrepackagedProjectsInSolutions) {
         "$TARGET_TYPE = \"Library\" $ROOT_TO_PROJDIR = \"pre\" export config { \"Debug|x64\" \"Odd|x64\" } { }");
   settings.solutionContainsPrepackagedProjects = false;
   LoadAndGenerate(CompilerKind::vc9);
-  const std::string app = "{22222222-2222-2222-2222-222222222222}";
   AssertHolds("all.sln",
-              "# Visual Studio 2008\n"
-              "Project(\"{8BC9CEB8-8B4A-11D0-8D11-00A0C91BC942}\") = \"app\", \"app.vcproj\", \"" +
-                  app +
-                  "\"\n"
-                  "\tProjectSection(ProjectDependencies) = postProject\n"
-                  "\tEndProjectSection\n"
-                  "EndProject\n"
-                  "Global\n"
-                  "\tGlobalSection(SolutionConfigurationPlatforms) = preSolution\n"
-                  "\t\tDebug|x64 = Debug|x64\n"
-                  "\t\tOdd|x64 = Odd|x64\n"
-                  "\t\tRelease|x64 = Release|x64\n"
-                  "\tEndGlobalSection\n"
-                  "\tGlobalSection(ProjectConfigurationPlatforms) = postSolution\n"
-                  "\t\t" +
-                  app +
-                  ".Debug|x64.ActiveCfg = Debug|x64\n"
-                  "\t\t" +
-                  app +
-                  ".Debug|x64.Build.0 = Debug|x64\n"
-                  "\t\t" +
-                  app +
-                  ".Release|x64.ActiveCfg = Release|x64\n"
-                  "\t\t" +
-                  app +
-                  ".Release|x64.Build.0 = Release|x64\n"
-                  "\tEndGlobalSection\n");
+              "\tProjectSection(ProjectDependencies) = postProject\n\tEndProjectSection\nEndProject\nGlobal\n");
+  AssertHolds("all.sln", "\t\tDebug|x64 = Debug|x64\n\t\tOdd|x64 = Odd|x64\n\t\tRelease|x64 = Release|x64\n\tEnd");
+  AssertLacks("all.sln", "}.Odd|x64");
 }
 
 TEST_F(ProjectDetailsTest, OptionsOfTheNewFormat) {
@@ -155,44 +126,37 @@ TEST_F(ProjectDetailsTest, Toolsets) {
   AssertLacks("app.vcproj", "Toolset");
 }
 
-// A utility project has no tool of any sort.
-TEST_F(ProjectDetailsTest, UtilityProjects) {
-  WriteProject("app", "Utility Project", "+link { /NOLOGO } { }");
-  LoadAndGenerate(CompilerKind::vc6);
-  AssertHolds("app.dsp", "# ADD BSC32 /nologo\n\n!ELSEIF");
-  LoadAndGenerate(CompilerKind::vc8);
-  AssertHolds("app.vcproj", "\t\t\tManagedExtensions=\"0\"\n\t\t\t>\n\t\t</Configuration>\n");
-  LoadAndGenerate(CompilerKind::vc14);
-  AssertHolds("app.vcxproj", "'=='Release|x64'\">\n  </ItemDefinitionGroup>\n");
-}
-
-TEST_F(ProjectDetailsTest, LibrarianOfTheNewFormat) {
-  WriteProject("lib", "Static Library", "+link (\"Debug\") { /NOLOGO /EXPORT:\"f\" } { }");
-  LoadAndGenerate(CompilerKind::vc14, "lib");
-  EXPECT_EQ(trace,
-            "todo : librarian switch ExportNamedFunctions = f\nWriting lib.vcxproj\nWriting lib.vcxproj.filters\n"
-            "Writing all.sln\n");
-  AssertHolds("lib.vcxproj", "    <Lib>\n      <SuppressStartupBanner>true</SuppressStartupBanner>\n    </Lib>\n");
-}
-
-TEST_F(ProjectDetailsTest, IncludesOfAllRoots) {
-  WriteProject("app", "Application",
-               R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj");
+TEST_F(ProjectDetailsTest, WhatKindsOfProjectsGet) {
   settings.virtualTree = {"tree", "other"};
-  LoadAndGenerate(CompilerKind::vc8);
-  AssertHolds("app.vcproj", "AdditionalIncludeDirectories=\"tree/app;tree/app/src;a;tree;other;tree/b;other/b\"\n");
-  LoadAndGenerate(CompilerKind::vc14);
-  AssertHolds("app.vcxproj",
-              ">tree/app;tree/app/src;a;tree;other;tree/b;other/b;%(AdditionalIncludeDirectories)</Additional");
-}
-
-TEST_F(ProjectDetailsTest, DebugByNameInVc6) {
-  WriteProject("app", "Console Application", "config { \"Win64 Debug|x64\" } { }");
-  LoadAndGenerate(CompilerKind::vc6);
-  AssertHolds("app.dsp", "# TARGTYPE \"Win32 (x86) Console Application\" 0x0103\n");
-  AssertHolds("app.dsp",
-              "!ELSEIF  \"$(CFG)\" == \"app - Win32 Win64 Debug\"\n\n# PROP BASE Use_MFC 0\n"
-              "# PROP BASE Use_Debug_Libraries 1\n");
+  const char* const kUtility = "Utility Project";  // which has no tool of any sort
+  const char* const kIncludes = R"qrpj(+cpp ("Debug") { /I "a" /I "$(VIRTUAL_TREE)" /I "$(VIRTUAL_TREE)/b" } { })qrpj";
+  const char* const kWin64 = "config { \"Win64 Debug|x64\" } { }";
+  const struct {
+    CompilerKind compiler;
+    const char *targetType, *statements, *file, *text;
+  } kRows[] = {
+      {CompilerKind::vc6, kUtility, "+link { /NOLOGO } { }", "app.dsp", "# ADD BSC32 /nologo\n\n!ELSEIF"},
+      {CompilerKind::vc8, kUtility, "{ }", "app.vcproj",
+       "\t\t\tManagedExtensions=\"0\"\n\t\t\t>\n\t\t</Configuration>\n"},
+      {CompilerKind::vc14, kUtility, "{ }", "app.vcxproj", "'=='Release|x64'\">\n  </ItemDefinitionGroup>\n"},
+      {CompilerKind::vc14, "Static Library", "+link (\"Debug\") { /NOLOGO /EXPORT:\"f\" } { }", "app.vcxproj",
+       "    <Lib>\n      <SuppressStartupBanner>true</SuppressStartupBanner>\n    </Lib>\n"},
+      {CompilerKind::vc8, "Application", kIncludes, "app.vcproj",
+       "AdditionalIncludeDirectories=\"tree/app;tree/app/src;a;tree;other;tree/b;other/b\"\n"},
+      {CompilerKind::vc14, "Application", kIncludes, "app.vcxproj",
+       ">tree/app;tree/app/src;a;tree;other;tree/b;other/b;%(AdditionalIncludeDirectories)</Additional"},
+      {CompilerKind::vc6, "Console Application", kWin64, "app.dsp",
+       "# TARGTYPE \"Win32 (x86) Console Application\" 0x0103\n"},
+      {CompilerKind::vc6, "Console Application", kWin64, "app.dsp",  // by its name
+       "app - Win32 Win64 Debug\"\n\n# PROP BASE Use_MFC 0\n# PROP BASE Use_Debug_Libraries 1\n"},
+  };
+  for (const auto& row : kRows) {
+    WriteProject("app", row.targetType, row.statements);
+    LoadAndGenerate(row.compiler);
+    AssertHolds(row.file, row.text);
+    const bool isTold = trace.starts_with("todo : librarian switch ExportNamedFunctions = f\nWriting app.vcxproj\n");
+    EXPECT_EQ(isTold, std::string(row.targetType) == "Static Library") << trace;
+  }
 }
 
 TEST_F(ProjectDetailsTest, GccWorkspaces) {

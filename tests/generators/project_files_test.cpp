@@ -37,7 +37,7 @@ std::string LinesBeyond(const std::string& text, const std::string& other, char 
   return beyond;
 }
 
-class ProjectFilesTest : public GenerateTest {
+class ProjectFilesTest : public GenerateTest, public ::testing::WithParamInterface<Format> {
  protected:
   // A translated form beside the plain one, any other file beside that of the application.
   static std::string Differences(const std::string& name) {
@@ -79,37 +79,33 @@ class ProjectFilesTest : public GenerateTest {
   }
 };
 
-TEST_F(ProjectFilesTest, Vc6) { AssertFormat({CompilerKind::vc6, false, "vc6", {}}); }
-TEST_F(ProjectFilesTest, Vc8) { AssertFormat({CompilerKind::vc8, false, "vc8", {}}); }
-TEST_F(ProjectFilesTest, Vc9) {
-  AssertFormat({CompilerKind::vc9,
-                false,
-                "vc8",
-                {{"Version=\"8.00\"", "Version=\"9.00\""},
-                 {"Version 9.00\n# Visual Studio 2005", "Version 10.00\n# Visual Studio 2008"}}});
-}
-TEST_F(ProjectFilesTest, Vc10) {
-  AssertFormat({CompilerKind::vc10,
-                true,
-                "vc14",
-                {{"ToolsVersion=\"14.0\"", "ToolsVersion=\"4.0\""},
-                 {"    <PlatformToolset>v140</PlatformToolset>\n", ""},
-                 {"Version 12.00\n# Visual Studio 2013", "Version 11.00\n# Visual Studio 2010"}}});
-}
-TEST_F(ProjectFilesTest, Vc11) {
-  AssertFormat({CompilerKind::vc11,
-                true,
-                "vc14",
-                {{"ToolsVersion=\"14.0\"", "ToolsVersion=\"4.0\""},
-                 {"v140", "v110_xp"},
-                 {"Visual Studio 2013", "Visual Studio 2012"}}});
-}
-TEST_F(ProjectFilesTest, Vc12) {
-  AssertFormat(
-      {CompilerKind::vc12, false, "vc14", {{"ToolsVersion=\"14.0\"", "ToolsVersion=\"12.0\""}, {"v140", "v120"}}});
-}
-TEST_F(ProjectFilesTest, Vc14) { AssertFormat({CompilerKind::vc14, false, "vc14", {}}); }
-TEST_F(ProjectFilesTest, Gcc) { AssertFormat({CompilerKind::gcc, false, "gcc", {}}); }
+const Format kFormats[] = {
+    {CompilerKind::vc6, false, "vc6", {}},
+    {CompilerKind::vc8, false, "vc8", {}},
+    {CompilerKind::vc9,
+     false,
+     "vc8",
+     {{"Version=\"8.00\"", "Version=\"9.00\""},
+      {"Version 9.00\n# Visual Studio 2005", "Version 10.00\n# Visual Studio 2008"}}},
+    {CompilerKind::vc10,
+     true,
+     "vc14",
+     {{"ToolsVersion=\"14.0\"", "ToolsVersion=\"4.0\""},
+      {"    <PlatformToolset>v140</PlatformToolset>\n", ""},
+      {"Version 12.00\n# Visual Studio 2013", "Version 11.00\n# Visual Studio 2010"}}},
+    {CompilerKind::vc11,
+     true,
+     "vc14",
+     {{"ToolsVersion=\"14.0\"", "ToolsVersion=\"4.0\""}, {"v140", "v110_xp"}, {"Studio 2013", "Studio 2012"}}},
+    {CompilerKind::vc12, false, "vc14", {{"ToolsVersion=\"14.0\"", "ToolsVersion=\"12.0\""}, {"v140", "v120"}}},
+    {CompilerKind::vc14, false, "vc14", {}},
+    {CompilerKind::gcc, false, "gcc", {}},
+};
+
+TEST_P(ProjectFilesTest, AreAsExpected) { AssertFormat(GetParam()); }
+
+INSTANTIATE_TEST_SUITE_P(, ProjectFilesTest, ::testing::ValuesIn(kFormats),
+                         [](const auto& each) { return std::string(CompilerOf(each.param.compiler).keyword); });
 
 }  // namespace
 

@@ -125,8 +125,6 @@ TEST(ExpressionTest, Syntax) {
       {"'a' += 'b'", "Can't assign to string r-value"},
       {"1 += 'b'", "Incompatible types (int64 and string) for + operation"},
       {"(1", "Expected ) after 1 when read EOS"},
-      {"'a'[0", "Expected ] after 0 when read EOS"},
-      {"true ? 1", "Expected : after 1 when read EOS"},
       {"\"a\".b", "Dot operator currently not supported"},
       {"\"a\"(1)", "Function application currently not supported"},
       {"1 $ 2", "1 then $"},

@@ -21,21 +21,6 @@ class FrameTest : public ::testing::Test {
   LSFileFrame a{world}, b{world}, c{world}, d{world};
 };
 
-TEST_F(FrameTest, NearerDefinitionsHide) {
-  LSFrame child(&a);
-  a.AddImport(b);
-  Define(b, "x", "b");
-  EXPECT_EQ("b", Find(child, "x"));
-  Define(a, "x", "a");
-  EXPECT_EQ("a", Find(child, "x"));
-  Define(child, "x", "child");
-  Define(child, "x", "newer");
-  EXPECT_EQ("newer", Find(child, "x"));
-  EXPECT_EQ("newer", child.FindInChain("x")->ValueText());
-  EXPECT_EQ(nullptr, child.FindInFrame("y", nullptr));
-  EXPECT_EQ("none", Find(child, "y"));
-}
-
 TEST_F(FrameTest, ImportsThatDisagree) {
   Define(d, "x", "d");
   b.AddImport(d);
@@ -51,19 +36,6 @@ TEST_F(FrameTest, ImportsThatDisagree) {
   LSFileFrame e(world);
   e.AddImport(b);
   EXPECT_EQ("b", Find(e, "x"));  // the nearer one, though d is in view
-}
-
-TEST_F(FrameTest, NamesEndWithTheirFrame) {
-  {
-    LSFileFrame other(world);
-    Define(other, "x", "other");
-    Define(other, "x", "newer");
-  }
-  a.AddImport(b);
-  EXPECT_EQ("none", Find(a, "x"));
-  Define(b, "x", "b");
-  EXPECT_EQ("b", Find(a, "x"));
-  EXPECT_EQ("b", Find(b, "x"));
 }
 
 TEST_F(FrameTest, Substitutions) {
@@ -156,40 +128,6 @@ TEST(SourceMapTest, Expansions) {
   const std::string output = ExpandToStringWithMap(nullptr, frame, TextRange(std::string_view(source)), 0, 0, map);
   EXPECT_EQ("x  long \"w\" y 2\nlong\nn\n", output);
   EXPECT_EQ("0+1 6+2 =8+4 9+1 =10+3 16+1 19+2 =21+1 29+1 =45+4 46+1 49+1 52+1", Runs(map, source));
-}
-
-TEST(SourceMapTest, Positions) {
-  SourceFileList files;
-  for (const char* text : {"a\nb", "c\n"}) {
-    files.push_back(std::make_unique<MpfwSourceFile>());
-    files.back()->path = "f" + std::to_string(files.size());
-    files.back()->text = text;
-  }
-  const auto report = [&](const char* position) {
-    MemoryTextWriter writer;
-    WriteMessage(writer, ParseErrorOf(files, LexScannerException("no", position)));
-    return writer.TakeText();
-  };
-  EXPECT_EQ("\nf1(1) : no\n", report(files[0]->text.data()));
-  EXPECT_EQ("\nf1(2) : no\n", report(files[0]->text.data() + 3));
-  EXPECT_EQ("\nf2(1) : no\n", report(files[1]->text.data() + 1));
-  EXPECT_EQ("\nf2(2) : no\n", report(files[1]->text.data() + 2));
-  EXPECT_EQ("\nno\n", report(nullptr));
-
-  const std::string output = "12";
-  const TextRange range{std::string_view(output)};
-  const char* source = files[0]->text.data();
-  SourceMap map;
-  map.AddVerbatim(source, source + 2);
-  const auto mapped = [&](const char* position) {
-    LexScannerException exception("no", position);
-    MapErrorPosition(map, range, exception);
-    return exception.position;
-  };
-  EXPECT_EQ(source + 1, mapped(output.data() + 1));
-  EXPECT_EQ(source + 1, mapped(output.data() + 2));  // the end counts as the last byte
-  EXPECT_EQ(source + 3, mapped(source + 3));
-  EXPECT_EQ(nullptr, mapped(nullptr));
 }
 
 }  // namespace qrex

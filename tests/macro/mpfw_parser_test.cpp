@@ -69,44 +69,6 @@ TEST_F(MpfwParserTest, ReportsErrors) {
   EXPECT_EQ("\ne(1) : Imports nested too deeply : f imports e imports f\n", trace);
 }
 
-TEST_F(MpfwParserTest, ReadsStrings) {
-  context.rootFrame.DefineSubstitution("v", "value");
-  std::string out;
-  const auto read = [&](const std::string& text, void (MpfwParser::*reader)(std::string&)) {
-    return With(text, [&] {
-      (parser.*reader)(out);
-      return out + "|" + Printed(parser.current);
-    });
-  };
-  EXPECT_EQ("a value|'a $(v)'", read("'a $(v)' x", &MpfwParser::ReadString));
-  EXPECT_EQ("Expected quoted string when read x", read("x", &MpfwParser::ReadString));
-  EXPECT_EQ("a/b|\"a/b\"", read("\"a/b\"", &MpfwParser::ReadPath));
-  EXPECT_EQ("Forward slashes must be used in \"a\\\\b\"", read("\"a\\\\b\"", &MpfwParser::ReadPath));
-  EXPECT_EQ("a|x", read("\"a\" x", &MpfwParser::ReadStringOrExpression));
-  EXPECT_EQ("value1|x", read("(\"$(v)\" + string(1)) x", &MpfwParser::ReadStringOrExpression));
-  EXPECT_EQ("No implicit conversion from int64 to string", read("(1)", &MpfwParser::ReadStringOrExpression));
-  EXPECT_EQ("Expected ) after \"a\" when read ;", read("(\"a\";", &MpfwParser::ReadStringOrExpression));
-  EXPECT_EQ("Expected quoted string when read 1", read("1", &MpfwParser::ReadStringOrExpression));
-}
-
-TEST_F(MpfwParserTest, ReadsNamedStrings) {
-  const auto read = [&](const std::string& text, bool isPath) {
-    return With(text, [&] {
-      std::string out = "old";
-      isPath ? parser.ReadNamedPath("N", out) : parser.ReadNamedString("N", out);
-      return out + "|" + Printed(parser.current);
-    });
-  };
-  EXPECT_EQ("$(x)|\"$(x)\"", read("$N = \"$(x)\" y", false));
-  EXPECT_EQ("Expected '$' when read N", read("N", false));
-  EXPECT_EQ("Expected 'N' when read M", read("$M", false));
-  EXPECT_EQ("Expected quoted string when read 'a'", read("$N = 'a'", false));
-  EXPECT_EQ("a/b|EOS", read("$N = \"a/b\"", true));
-  EXPECT_EQ("|y", read("$N = \"\" y", true));
-  EXPECT_EQ("Forward slashes must be used in \"a\\\\b\"", read("$N = \"a\\\\b\"", true));
-  EXPECT_EQ("Path can't end with a trailing slash : \"a/\"", read("$N = \"a/\"", true));
-}
-
 TEST_F(MpfwParserTest, Statements) {
   const auto import = [&](const std::string& text) {
     return With(text, [&] {

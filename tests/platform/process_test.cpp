@@ -65,16 +65,6 @@ TEST_F(ProcessTest, Ends) {
   }
 }
 
-TEST_F(ProcessTest, StreamsKeepTheirOrder) {
-  Program program = Script("echo 1; echo 2 >&2; echo 3");
-  EXPECT_EQ("1\n2\n3\n", Output(program));
-  program.errorsIntoOutput = false;
-  program.errors = Stream::Captured;
-  Processes::Ended apart = tools.Run(program);
-  EXPECT_EQ("1\n3\n", apart.output.Take());
-  EXPECT_EQ("2\n", apart.errors.Take());
-}
-
 TEST_F(ProcessTest, WhatIsPrintedMayBeLarge) {
   const std::string text = Output(Script("head -c 5000000 /dev/zero | tr '\\0' x; echo end"));
   EXPECT_EQ(5000004u, text.size());
@@ -158,27 +148,10 @@ TEST_F(ProcessTest, Children) {
 
 // --- Lines for the command interpreter
 
-TEST_F(ProcessTest, Commands) {
-  EXPECT_EQ(3, Code("cmd /c exit 3"));
-  EXPECT_EQ(0, Code("true"));
-  EXPECT_EQ(127, Code("cmd /c command-that-is-nowhere 2>/dev/null"));
-  SetEnvironment("QREX_TEST", "a b");
-  EXPECT_EQ(0, Code("printenv QREX_TEST 1>/dev/null"));
-  // In quotes and outside of them what the shell would act on is text.
-  for (const std::string text : {"$QREX_TEST", "`exit`", "a;exit", "a&b|c", "it's", "*", "a\\b"}) {
-    EXPECT_EQ(0, Code("touch \"" + text + "\"")) << text;
-    EXPECT_TRUE(std::filesystem::remove(text)) << text;
-    EXPECT_EQ(0, Code("touch " + text)) << text;
-    EXPECT_TRUE(std::filesystem::remove(text)) << text;
-  }
-}
-
 // A line that needs no shell is run without one; 2>&1 needs it.
 TEST_F(ProcessTest, TheSameWithAShellAndWithout) {
-  Write("bin/show", "#!/bin/sh\nfor word; do printf '<%s>' \"$word\"; done\nexit 5\n");
-  std::filesystem::permissions("bin/show", std::filesystem::perms::owner_all);
+  WriteProgram("bin/show", "for word; do printf '<%s>' \"$word\"; done\nexit 5\n");
   std::filesystem::create_directory("bin/folder");
-  const std::string path = std::getenv("PATH");
   SetEnvironment("PATH", "bin:/bin:/usr/bin");
   int plainCount = 0;
   for (const std::string line :
@@ -191,13 +164,10 @@ TEST_F(ProcessTest, TheSameWithAShellAndWithout) {
     plainCount += WordsWithoutInterpreter(line).empty() ? 0 : 1;
   }
   EXPECT_EQ(6, plainCount);
-  SetEnvironment("PATH", path);
 }
 
 TEST_F(ProcessTest, CompilerOfTheGccFamily) {
-  Write("bin/gcc", "#!/bin/sh\nexit 7\n");
-  std::filesystem::permissions("bin/gcc", std::filesystem::perms::owner_all);
-  const std::string path = std::getenv("PATH");
+  WriteProgram("bin/gcc", "exit 7\n");
   SetEnvironment("PATH", "bin:/bin:/usr/bin");
   EXPECT_EQ(7, Code("cmd /c gcc-4 x"));  // where no gcc-4 is on the path, gcc serves
   std::filesystem::rename("bin/gcc", "bin/gcc-4");
@@ -205,7 +175,6 @@ TEST_F(ProcessTest, CompilerOfTheGccFamily) {
   EXPECT_EQ(FindProgram("bin/gcc-4"), FindProgram("gcc-4"));
   EXPECT_EQ(std::filesystem::current_path() / "bin/gcc-4", FindProgram("gcc-4"));
   EXPECT_EQ("", FindProgram("gcc-5") + FindProgram("none/gcc-4"));
-  SetEnvironment("PATH", path);
 }
 
 TEST_F(ProcessTest, BatchFile) {

@@ -40,16 +40,6 @@ TEST_F(SystemTest, DeepStack) {
   EXPECT_FALSE(IsStackShort());
 }
 
-TEST_F(SystemTest, Times) {
-  constexpr int64_t kTheYear2000 = 125911584000000000, kTenYears = int64_t{10} * 366 * 24 * 3600 * 10000000;
-  EXPECT_GT(SystemFileTime(), kTheYear2000 + 2 * kTenYears);
-  Write("a/time", "");
-  FileInfo info;
-  ASSERT_TRUE(Stat("a/time", info));
-  EXPECT_LT(std::abs(SystemFileTime() - info.writeTime), 100000000);
-  EXPECT_EQ("time", info.name);
-}
-
 TEST_F(SystemTest, ErrorCodes) {
   const std::string path = "f";
   std::string content;

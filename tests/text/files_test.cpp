@@ -172,28 +172,6 @@ TEST_F(FilesTest, LineEnds) {
   EXPECT_EQ("\r\na\r\n\r\nb", WithCarriageReturns("\na\n\nb"));
 }
 
-TEST_F(FilesTest, CheckedFile) {
-  const std::string path = "f";
-  Write(path, "");
-  std::string payload = "old";
-  EXPECT_FALSE(ReadCheckedFile(7, payload, path));
-  WriteCheckedFile(7, "123456789", path);
-  std::string bytes = Read(path);
-  EXPECT_EQ(std::string("\7\0\0\0\x26\x39\xf4\xcb\x09\0\0\0\0\0\0\0", 16) + "123456789", bytes);
-  EXPECT_FALSE(ReadCheckedFile(8, payload, path));
-  EXPECT_TRUE(ReadCheckedFile(7, payload, path));
-  EXPECT_EQ("123456789", payload);
-  const auto readsWith = [&](size_t at, char byte) {
-    std::string damaged = bytes;
-    damaged[at] = byte;
-    Write(path, damaged);
-    return ReadCheckedFile(7, payload, path);
-  };
-  EXPECT_FALSE(readsWith(20, 'x') || readsWith(15, '\x80') || readsWith(8, 10) || readsWith(4, 0));
-  Write(path, bytes + "behind");
-  EXPECT_TRUE(ReadCheckedFile(7, payload, path));
-}
-
 TEST_F(FilesTest, FileClass) {
   const std::string path = "f";
   Write(path, "");

@@ -199,70 +199,9 @@ TEST_F(OutputPolicyTest, CopiesWhatDiffersWhereStampsAreNear) {
       EXPECT_FALSE(IsReadOnly("to") || LastWriteTime("to") >= copied);
     }
   }
-  // A copy is as old as the begin of its reading; and what can't be looked for is told.
-  Write("large", std::string(32 << 20, 'x'));
-  SetAge("large", 10);
-  EXPECT_TRUE(CopyIfNewer(settings.leftovers, "large", "copy", false));
-  Write("behind", "");
-  EXPECT_LT(LastWriteTime("copy") + 20'000, LastWriteTime("behind"));
+  // What can't be looked for is told.
   EXPECT_FALSE(CopyIfNewer(settings.leftovers, "from/x", "to", false));
   EXPECT_EQ("...Copy file failed\n", trace);
-}
-
-// Of a link, symbolic or a further name, what it leads to stays as it is.
-TEST_F(OutputPolicyTest, ReplacesLinksAlone) {
-  for (const bool isSymbolic : {true, false}) {
-    for (int way = 0; way < 4; ++way) {
-      Write("elsewhere", "theirs");
-      SetReadOnly("elsewhere", true);
-      if (isSymbolic) {
-        std::filesystem::create_symlink("elsewhere", "out");
-      } else {
-        std::filesystem::create_hard_link("elsewhere", "out");
-      }
-      Write("from", "new");
-      SetAge("from", -100);
-      if (way == 0) {
-        EXPECT_TRUE(CopyIfNewer(settings.leftovers, "from", "out", false));
-      }
-      if (way == 1) {
-        EXPECT_TRUE(DeleteReporting("out"));
-      }
-      if (way == 2) RemoveLink("out");
-      if (way == 3) ChangeReadOnly("out", false);
-      EXPECT_EQ("theirs", Read("elsewhere")) << way;
-      EXPECT_TRUE(IsReadOnly("elsewhere")) << way;
-      EXPECT_EQ(way == 3, std::filesystem::exists("out") && Read("out") == "theirs") << way;
-      std::filesystem::remove("out");
-      std::filesystem::remove("elsewhere");
-    }
-  }
-  EXPECT_EQ("Deleting out\nDeleting out\n", trace);
-}
-
-TEST_F(OutputPolicyTest, Deletes) {
-  Write("x", "");
-  ChangeReadOnly("x", true);
-  DeleteReporting("x");
-  DeleteReporting("x");
-  EXPECT_EQ("Deleting x\n", trace);
-  EXPECT_FALSE(FileExists("x"));
-}
-
-TEST_F(OutputPolicyTest, TimingLines) {
-  { ScopeTimer silent; }
-  EXPECT_EQ("", trace);
-  {
-    ScopeTimer timer;
-    timer.Stop();
-    timer.Label() << "app";
-  }
-  EXPECT_TRUE(std::regex_match(TakeTrace(), std::regex("app\\.{85} [ \\d]{4}\\.\\d\\d ms\n")));
-  {
-    ScopeTimer timer(true);
-    timer.Label() << std::string(100, 'x');
-  }
-  EXPECT_TRUE(std::regex_match(TakeTrace(), std::regex("x{88} [ \\d]{4}\\.\\d\\d ms\n")));
 }
 
 }  // namespace

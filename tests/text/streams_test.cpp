@@ -9,31 +9,6 @@
 
 namespace qrex {
 
-TEST(StreamsTest, PagedBuffer) {
-  PagedBuffer buffer(4);
-  buffer.Write("abcd", 4);
-  EXPECT_EQ(1u, buffer.PageCount());
-  const char* first = buffer.Page(0);
-  buffer.Write("e", 1);
-  EXPECT_EQ(2u, buffer.PageCount());
-  buffer.Write("fghijk", 6);
-  EXPECT_EQ(first, buffer.Page(0));
-  std::string text = ">";
-  buffer.AppendTo(text);
-  EXPECT_EQ(">abcdefghijk", text);
-  buffer.SetSize(5, false);
-  EXPECT_EQ(3u, buffer.PageCount());
-  buffer.Write("!", 1);
-  text.clear();
-  buffer.AppendTo(text);
-  EXPECT_EQ("abcde!", text);
-  buffer.SetSize(4, true);
-  EXPECT_EQ(1u, buffer.PageCount());
-  buffer.Clear();
-  EXPECT_EQ(0u, buffer.PageCount());
-  EXPECT_EQ(0u, buffer.Size());
-}
-
 TEST(StreamsTest, Readers) {
   PagedBuffer buffer(4);
   PagedBufferToOutputStreamAdapter(buffer).Write("abcdefghij", 10);
@@ -69,32 +44,6 @@ TEST(StreamsTest, Copies) {
   EXPECT_EQ(9000, CopyStream(writer, in, 9000));
   EXPECT_EQ(11000, CopyStream(writer, in));
   EXPECT_EQ(block, writer.TakeText());
-}
-
-TEST(TextWriterTest, Indentation) {
-  MemoryTextWriter writer;
-  writer.AddIndent(4);
-  writer << "a\n\nb";
-  EXPECT_EQ("    a\n    \n    b", writer.TakeText());
-  writer << "c\n";
-  EXPECT_EQ("c\n", writer.TakeText());
-  writer << 'd' << std::string(5000, 'e') << "\n";
-  EXPECT_EQ("    d" + std::string(5000, 'e') + "\n", writer.TakeText());
-  writer << "x\n";
-  {
-    IndentScope outer(writer, -4);
-    writer << "y\n";
-    {
-      IndentScope inner(writer, -4);
-      writer << "z\n";
-    }
-    writer << "w\n";
-  }
-  writer << "v";
-  EXPECT_EQ("    x\ny\nz\nw\n    v", writer.TakeText(false));
-  EXPECT_EQ("    x\ny\nz\nw\n    v", writer.TakeText());
-  EXPECT_EQ("", writer.TakeText());
-  EXPECT_EQ(4, writer.Indent());
 }
 
 TEST(TextWriterTest, Values) {

@@ -81,17 +81,6 @@ G g(const_cast<Base*>(this),g_delegator::static_delegate);
             Instance("$makeconstfunctor G g(this, Base)\n{\n\tgo();\n}\n"));
 }
 
-TEST_F(FunctorsTest, Messages) {
-  AssertMessages({
-      {"\n$functor <<-reflect>> void F();",
-       "t.h(2) : warning W1004 : $functor  is not reflected and has redundant << >> directives\n"},
-      {"$functor void F() : [ 1 ];", "t.h(1) : warning W1001 : Non-reflected $functor F contains metadata\n"},
-      {"$enum E { a };\n$functor+ E F();",
-       "t.h(2) : warning W1002 : Reflected $functor+ F references non-registered $enum E\n"
-       "t.h(1) : see declaration of $enum E\n"},
-  });
-}
-
 TEST_F(FunctorsTest, Errors) {
   const std::string functor = "$functor void F();\n";
   AssertErrors({
@@ -101,12 +90,6 @@ TEST_F(FunctorsTest, Errors) {
       {"$functor+ void F(int a);", 1, "Can't accept platform dependent type: int"},
       {functor + functor, 2, "$functor F conflicts with previous declaration of $functor F"},
       {"$functor void F()\nint x;", 2, "; expected after definition of $functor F when read int"},
-      {"$enum E { a };\n$makefunctor E e { }", 2, "Expected functor identifier after E when read e"},
-      {functor + "$makefunctor F 7 { }", 2, "Expected identifier after F when read 7"},
-      {functor + "$makefunctor F f(a) { }", 2, "Expected , after ( when read )"},
-      {functor + "$makefunctor F f(a, b, c) { }", 2, "Expected ) after , when read ,"},
-      {functor + "$makefunctor F f;", 2, "Expected { after f when read ;"},
-      {functor + "$makefunctor F f { ", 2, "Met EOS before read matching brace"},
   });
 }
 

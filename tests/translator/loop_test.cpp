@@ -16,14 +16,6 @@ class LoopTest : public TranslateTest {
   }
 };
 
-TEST_F(LoopTest, CopiesPlainText) {
-  const std::string text = "// a comment\n\n#include <vector>\nint f() { return 1; /* } */ }\n\tusing namespace std;\n";
-  EXPECT_EQ(text, Translate("a.cpp", text));
-  EXPECT_EQ("", Translate("b.cpp", ""));
-  EXPECT_EQ("int x = '$' ? 1 : 0; // $struct\nconst char* s = \"$class }\";",
-            Translate("c.c", "int x = '$' ? 1 : 0; // $struct\nconst char* s = \"$class }\";"));
-}
-
 TEST_F(LoopTest, WrapsHeaders) {
   EXPECT_EQ(
       "#pragma once\n#ifndef _app_src_sub_dir_my_file2_h\n#define _app_src_sub_dir_my_file2_h\n\nint x;"
@@ -108,13 +100,6 @@ TEST_F(LoopTest, WordsOfCppInDeclarations) {
             Translate("d.h", "[[nodiscard]] constexpr $function+ int32 f() { return 1; }").find(passes));
 }
 
-TEST_F(LoopTest, DollarNew) {
-  EXPECT_EQ("p = vesk::DollarNew(new a::b<c>(d));\nq = vesk::DollarNew(new  T );{}",
-            Translate("t.cpp", "p = $new a::b<c>(d);\nq = $new  T ;{}"));
-  EXPECT_EQ("vesk::DollarNew(new V<W<int>>(f(1), \")\")(2)), vesk::DollarNew(new X);",
-            Translate("u.cpp", "$new V<W<int>>(f(1), \")\")(2), $new X;"));
-}
-
 TEST_F(LoopTest, InitAndUninit) {
   const std::string text = Translate("app.cpp", "$init { a(); }\nnamespace n { $init {}\n}\n$uninit { b(); }\n");
   EXPECT_EQ(
@@ -138,13 +123,7 @@ TEST_F(LoopTest, ErrorsOfDirectives) {
       {"int a;\n$", 2, "'$EOS' is not a valid directive"},
       {"$enum e { x };\nnamespace e { }", 2, "Can't open namespace e : $enum e is not a namespace"},
       {"$new 1;", 1, "Expected identifier after new when read 1"},
-      {"$new a::\n;", 2, "Expected identifier after :: when read ;"},
-      {"$new a<", 1, "Reached end of stream while scanning for matching >"},
-      {"$new a(", 1, "Reached end of stream while scanning for matching )"},
-      {"$init x", 1, "Expected { after init when read x"},
-      {"$uninit\n\nx", 3, "Expected { after uninit when read x"},
       {"$makefunctor nothing f { }", 1, "Unrecognised identifier : nothing"},
-      {"$enum e { x }; $makefunctor\ne f { }", 2, "Expected functor identifier after e when read f"},
   });
 }
 

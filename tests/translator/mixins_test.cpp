@@ -5,32 +5,6 @@ namespace {
 
 using MixinsTest = TranslateTest;
 
-constexpr char kListOfEverySort[] = R"($mixin M << reflect >> { $int32 a; };
-$model Pos { bool y; };
-namespace n { $mixin T { }; }
-$class+ K : mixin [ M { $bool b; int plain; } Pos ? other::U <int, 3> n::T<char> model { int8 z; } ]
-{
-};
-)";
-
-// What a mixin reflects stands in the record of the class; the model of an entry is reached through its _model_.
-TEST_F(MixinsTest, RecordOfAClassWithMixins) {
-  const std::string tail = TranslateHeader(kListOfEverySort).tail;
-  EXPECT_EQ(Section(tail, "K_fields[] =\n", "        };"), "        {\n            { \"a\", offsetof(K,a), K_a },\n");
-  EXPECT_EQ(Section(tail, "K_modelFields[] =\n", "        };"),
-            "        {\n            { \"y\", offsetof(K,_model_.y), K_y, 0, -1 },\n"
-            "            { \"z\", offsetof(K,_model_.z), K_z, 0, -1 },\n");
-
-  settings.compilableText = true;  // the model in the body of a mixin has no member to stand in
-  const std::pair<std::string, std::string> models[] = {{"$mixin M { $model { int8 a; } };", "a"},
-                                                        {"$mixin M : model { int8 a; } { };", "_model_.a"},
-                                                        {"$model M { int8 a; };", "_model_.a"}};
-  for (const auto& [text, place] : models) {
-    const std::string record = TranslateHeader(text + " $struct+ K : mixin [ M ] { };").tail;
-    EXPECT_NE(record.find("{ \"a\", offsetof(K," + place + "), K_a, 0, -1 },\n"), record.npos) << text;
-  }
-}
-
 TEST_F(MixinsTest, Implementing) {
   const std::string declared =
       "$interface+ I : vesk::IObject { int32 f(int32 a=1) const; void g(); };\n$adt A { void h(string8 s); };\n";
@@ -51,41 +25,13 @@ TEST_F(MixinsTest, Faults) {
       {"$interface I { };\n$class K : mixin [\nI\n] { };", 3, "$interface I is not a $class or $struct"},
       {"$class K : mixin [ X ] { };", 1, "Unrecognised identifier : X"},
       {"$mixin M { };\n$class K : mixin [ M, M ] { };", 2, "Expected identifier after M when read ,"},
-      {"$class K : mixin [ ? 5 ] { };", 1, "Expected mixin name when read 5"},
       {"$class K : mixin [ ? a::\n5 ] { };", 2, "Expected identifier after a:: when read 5"},
       {"$class K : mixin [\nmodel\n+ ] { };", 2, "Expected { after 'model' when read +"},
-      {"$class K : mixin [ ?\nM<int", 2, "Met EOS before read matching angled bracket"},
       {"$class K { $implementing K; };", 1, "$interface identifier expected when read $class K"},
       {"$interface I { };\n$class K { $implementing\nadt I; };", 3, "$adt identifier expected when read $interface I"},
       {"$interface I { };\n$class K { $implementing I -f; };", 2, "- not supported"},
       {"$interface I { void f(); };\n$class K { $implementing I { f\ng }; };", 3, "$interface I has no method named g"},
-      {"$interface I { };\n$class K { $implementing I { 5 }; };", 2, "Expected identifier after { when read 5"},
-      {"$interface I { };\n$class K { $implementing I { } x", 2, "Expected , or ; after } when read x"},
   });
-}
-
-// What the archive functions of a model in a class call is declared ahead of the outermost class, where there is one.
-TEST_F(MixinsTest, ArchivesInPlace) {
-  const std::string model = " : model { int32 a; } ";
-  const std::pair<std::string, bool> cases[] = {
-      {"$struct S" + model + "{ int other; };", false},
-      {"$struct S { $model { int32 a; } };", false},
-      {"$struct S : mixin [ M ] { };\n$model Own { int32 a; };", false},
-      {"$struct S<typename T> { };\n$struct U" + model + "{ };", false},
-      {"$struct S<typename T>" + model + "{ };", true},
-      {"$struct S<typename T> { $model { int32 a; } };", true},
-      {"$struct S { int a[2] = { }; $struct In" + model + "{ }; };", true},
-      {"$struct S { $struct In { $model { int32 a; } }; };", true},
-      {"$struct S : mixin [ model { int32 a; } ] { };", true},
-      {"$mixin S" + model + "{ };", true},
-  };
-  for (const bool wanted : {true, false}) {
-    settings.compilableText = wanted;
-    for (const auto& [text, inPlace] : cases) {
-      const std::string header = TranslateHeader("$mixin M { };\nnamespace n { " + text + " }").header;
-      EXPECT_EQ(header.find("} //n\nnamespace vesk\n{\n    RSN ") != std::string::npos, wanted && inPlace) << text;
-    }
-  }
 }
 
 // Functions are friends where they stand in a class, not where it is only called nested.

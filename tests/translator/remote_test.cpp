@@ -14,11 +14,5 @@ TEST_F(RemoteTest, Faults) {
   AssertErrors(cases, "$interface ipc I {\n", " };");
 }
 
-TEST_F(RemoteTest, RegisteredNames) {
-  TranslateHeader("$interface rmi I { };\nnamespace n { $interface ipc J { }; }");
-  EXPECT_EQ((std::vector<std::string>{"StubI", "SkeletonI", "n::StubJ", "n::ScionJ"}),
-            builder->RegisterMap().entries["app/src/t.cpp"]);
-}
-
 }  // namespace
 }  // namespace qrex

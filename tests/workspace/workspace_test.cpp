@@ -54,13 +54,8 @@ TEST_F(WorkspaceFileTest, Messages) {
   Write("tree/macro.qrws", "\n@else");
   for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
            {"all", "(1) : Expected double quoted string when read all"},
-           {"'all' { }", "(1) : Expected double quoted string when read 'all'"},
-           {"\"all\"\n(", "(2) : Expected { when read ("},
-           {"\"all\" {\napp }", "(2) : Expected double quoted string when read app"},
-           {"\"all\" { \"app\"\n", "(1) : Expected double quoted string when read EOS"},
            {"\"all\" {\n\"a\\\\b\" }", "(2) : Forward slashes must be used in \"a\\\\b\""},
            {"\"all\" {\n\"none.qrws\"\n}", "(2) : Couldn't open workspace file none.qrws"},
-           {"@frob \"x\"", "(1) : Syntax error: @frob"},
        }) {
     AssertError(text, std::string("\ntree/all.qrws") + message + "\n");
   }
@@ -89,13 +84,6 @@ class GraphTest : public WorldTest {
   }
   Project& Named(const char* name) { return *workspace->FindProjectByName(name); }
 };
-
-TEST_F(GraphTest, ProjectPaths) {
-  EXPECT_EQ("lib/Util/src/Util.qrpj", ProjectPathOf("lib/Util"));
-  EXPECT_EQ("a/b.QRPJ", ProjectPathOf("a/b.QRPJ"));
-  EXPECT_EQ("a/b.cpp/src/b.cpp.qrpj", ProjectPathOf("a/b.cpp"));
-  EXPECT_EQ("a/", ProjectPathOf("a/"));
-}
 
 TEST_F(GraphTest, Order) {
   WriteProject("a", "subproj { \"c\" \"b\" } { }");

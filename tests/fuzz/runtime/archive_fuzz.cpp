@@ -1,16 +1,12 @@
 // Archives of every kind. The first byte of an input says as what the rest is read; an archive is read or refused with
 // an ArchiveError, and what was read is printed, compared, copied, and written again. What is written of it is read
 // back as the same bytes.
-#include <fstream>
 #include <functional>
-#include <string>
-#include <vector>
 
 #include "kinds/graph.h"
 #include "kinds/kinds.h"
 #include "kinds/models.h"
-
-void Register_Project_kinds();
+#include "seeds.h"
 
 namespace {
 
@@ -113,18 +109,7 @@ std::vector<Bytes> Seeds() {
 
 }  // namespace
 
-// `--seeds FOLDER` writes them.
-extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) {
-  Register_Project_kinds();
-  if (*count < 3 || std::string((*arguments)[1]) != "--seeds") return 0;
-  const std::vector<Bytes> seeds = Seeds();
-  for (std::size_t kind = 0; kind < seeds.size(); ++kind) {
-    std::ofstream file((*arguments)[2] + ("/seed" + std::to_string(kind)), std::ios::binary);
-    file.put(static_cast<char>(kind));
-    file.write(reinterpret_cast<char const*>(seeds[kind].data()), static_cast<std::streamsize>(seeds[kind].size()));
-  }
-  std::exit(0);
-}
+extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) { return Begin(*count, *arguments, Seeds); }
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size > 0) kKinds[data[0] % kKindCount](Bytes(data + 1, data + size));

@@ -1,13 +1,9 @@
 // JSON of every kind. The first byte of an input says as what the rest is read; a text is read or refused with an
 // AccessError, and what was read is written, and reads back as the same text.
-#include <fstream>
-#include <string>
-#include <vector>
 
 #include "Vesk/vxObject/Json.h"
 #include "kinds/plain.h"
-
-void Register_Project_kinds();
+#include "seeds.h"
 
 namespace {
 
@@ -108,18 +104,7 @@ std::vector<std::string> Seeds() {
 
 }  // namespace
 
-// `--seeds FOLDER` writes them.
-extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) {
-  Register_Project_kinds();
-  if (*count < 3 || std::string((*arguments)[1]) != "--seeds") return 0;
-  const std::vector<std::string> seeds = Seeds();
-  for (std::size_t kind = 0; kind < seeds.size(); ++kind) {
-    std::ofstream file((*arguments)[2] + ("/seed" + std::to_string(kind)), std::ios::binary);
-    file.put(static_cast<char>(kind));
-    file << seeds[kind];
-  }
-  std::exit(0);
-}
+extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) { return Begin(*count, *arguments, Seeds); }
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size > 0) kKinds[data[0] % kKindCount](std::string_view(reinterpret_cast<char const*>(data) + 1, size - 1));

@@ -2,13 +2,9 @@
 // one after the other, or the answers that a client gets to a call. Each message is a length in one byte and its bytes.
 // A server comes through whatever it is sent and answers the call behind it; a client's call ends with its values or an
 // error, and no later answer finds what it waited with.
-#include <fstream>
-#include <string>
-#include <vector>
 
 #include "kinds/remote.h"
-
-void Register_Project_kinds();
+#include "seeds.h"
 
 namespace {
 
@@ -82,32 +78,28 @@ Bytes Message(std::initializer_list<vesk::uint32> numbers, Values const&... valu
   return ar.m_bytes;
 }
 
-std::vector<std::vector<Bytes>> Seeds() {
+// Messages, each behind its size.
+Bytes Joined(std::initializer_list<Bytes> messages) {
+  Bytes bytes;
+  for (Bytes const& message : messages) {
+    bytes.push_back(vesk::octet_t(message.size()));
+    bytes.insert(bytes.end(), message.begin(), message.end());
+  }
+  return bytes;
+}
+
+std::vector<Bytes> Seeds() {
   const vesk::string8 text = "text";
   const vesk::xvector<vesk::int32> numbers = {1, 2, 3};
-  return {{Message({1, 0, 1}, vesk::int32(3), text), Message({1, 1, 2}, text, vesk::int32(3)),
-           Message({1, 2, 0}, vesk::int32(3)), Message({1, 3, 0}), Message({1, 4, 0}, kinds::Size(4)),
-           Message({1, 5, 3}, numbers)},
-          {Message({1, 0}, text, vesk::int32(1)), Message({2, 0}, numbers), Message({3, 1}, text)}};
+  return {Joined({Message({1, 0, 1}, vesk::int32(3), text), Message({1, 1, 2}, text, vesk::int32(3)),
+                  Message({1, 2, 0}, vesk::int32(3)), Message({1, 3, 0}), Message({1, 4, 0}, kinds::Size(4)),
+                  Message({1, 5, 3}, numbers)}),
+          Joined({Message({1, 0}, text, vesk::int32(1)), Message({2, 0}, numbers), Message({3, 1}, text)})};
 }
 
 }  // namespace
 
-// `--seeds FOLDER` writes them.
-extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) {
-  Register_Project_kinds();
-  if (*count < 3 || std::string((*arguments)[1]) != "--seeds") return 0;
-  const std::vector<std::vector<Bytes>> seeds = Seeds();
-  for (std::size_t side = 0; side < seeds.size(); ++side) {
-    std::ofstream file((*arguments)[2] + ("/seed" + std::to_string(side)), std::ios::binary);
-    file.put(static_cast<char>(side));
-    for (Bytes const& message : seeds[side]) {
-      file.put(static_cast<char>(message.size()));
-      file.write(reinterpret_cast<char const*>(message.data()), static_cast<std::streamsize>(message.size()));
-    }
-  }
-  std::exit(0);
-}
+extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) { return Begin(*count, *arguments, Seeds); }
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
   if (size == 0) return 0;

@@ -23,41 +23,39 @@ $interface+ IThing : vesk::IObject {
     Colour colour;
 };
 
+// The functions of an attribute that a member holds.
+#define ATTRIBUTE(TYPE, NAME, MEMBER) \
+    TYPE Get##NAME() const { return MEMBER; } \
+    void Set##NAME(TYPE const& v) { MEMBER = v; }
+
 $class+ Thing isa IThing {
 public:
     vesk::string8 Getname() const { return name; }
     void Setname(const vesk::string8& v) { name = v; }
     vesk::string8 Gettitle() const { return "title of " + name; }
-    vesk::DynArray<vesk::int32> Getnumbers() const { return numbers; }
-    void Setnumbers(vesk::DynArray<vesk::int32> const& v) { numbers = v; }
-    vesk::Array<vesk::int32, 3> Getfixed() const { return fixed; }
-    void Setfixed(vesk::Array<vesk::int32, 3> const& v) { fixed = v; }
+    ATTRIBUTE(vesk::DynArray<vesk::int32>, numbers, numbers)
+    typedef vesk::Array<vesk::int32, 3> Fixed;
+    ATTRIBUTE(Fixed, fixed, fixed)
     vesk::int32 GetvectorSize() const { return 0; }
     void DeleteFromvector(vesk::int32, vesk::int32) {}
     void RecordExtractFromvector(vesk::int32, vesk::int32, vesk::xvector<vesk::int32>&, vesk::int32) {}
     void InsertIntovector(vesk::int32, vesk::xvector<vesk::int32>&, vesk::int32, vesk::int32) {}
     vesk::int32 GetvectorElement(vesk::int32) const { return 0; }
     void SetvectorElement(vesk::int32, vesk::int32) {}
-    vesk::xmap<vesk::int32, vesk::string8> Getmap() const { return map; }
-    void Setmap(vesk::xmap<vesk::int32, vesk::string8> const& v) { map = v; }
-    vesk::xset<vesk::int32> Getset() const { return set; }
-    void Setset(vesk::xset<vesk::int32> const& v) { set = v; }
-    vesk::int32 Getsizewidth() const { return plain; }
-    void Setsizewidth(vesk::int32 v) { plain = v; }
-    vesk::int32 Getplain() const { return plain; }
-    void Setplain(vesk::int32 v) { plain = v; }
+    typedef vesk::xmap<vesk::int32, vesk::string8> Map;
+    ATTRIBUTE(Map, map, map)
+    ATTRIBUTE(vesk::xset<vesk::int32>, set, set)
+    ATTRIBUTE(vesk::int32, sizewidth, plain)
+    ATTRIBUTE(vesk::int32, plain, plain)
     vesk::int32 GetreadOnly() const { return plain + 1; }
-    vesk::int32 Getmoved() const { return plain; }
-    void Setmoved(vesk::int32 v) { plain = v; }
-    vesk::xvector<vesk::int32> Getwhole() const { return whole; }
-    void Setwhole(vesk::xvector<vesk::int32> const& v) { whole = v; }
-    Colour Getcolour() const { return colour; }
-    void Setcolour(Colour v) { colour = v; }
+    ATTRIBUTE(vesk::int32, moved, plain)
+    ATTRIBUTE(vesk::xvector<vesk::int32>, whole, whole)
+    ATTRIBUTE(Colour, colour, colour)
 private:
     vesk::string8 name;
     vesk::DynArray<vesk::int32> numbers;
-    vesk::Array<vesk::int32, 3> fixed;
-    vesk::xmap<vesk::int32, vesk::string8> map;
+    Fixed fixed;
+    Map map;
     vesk::xset<vesk::int32> set;
     vesk::xvector<vesk::int32> whole;
     vesk::int32 plain = 0;

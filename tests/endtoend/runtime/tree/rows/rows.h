@@ -57,3 +57,11 @@ T Copied(T const& from) {
     Copy(from, to);
     return to;
 }
+
+// What comes out of an archive of a value that `set` has filled.
+template <typename T, typename Set>
+T Through(Set set) {
+    T value;
+    set(value);
+    return Copied(value);
+}

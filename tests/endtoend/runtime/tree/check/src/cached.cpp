@@ -1,6 +1,7 @@
-// Cached functions where what their nodes inherit depends on template parameters.
+// Cached functions, also where what their nodes inherit depends on template parameters.
 @import "rows/rows.h"
 @import "kinds/cached.h"
+@import "kinds/graph.h"
 
 using namespace kinds;
 
@@ -48,7 +49,10 @@ struct Seen : vesk::IObjectVisitor {
 
 }
 
-ROW(CachesInTemplates) {
+ROW(CachedFunctions) {
+    Cell cell;
+    CheckCachesOf(cell, "Cell");
+
     WithCaches mixed;
     CheckCachesOf(mixed, "CacheMixin");
     Seen seen;

@@ -52,26 +52,7 @@ ROW(Graph) {
 
 ROW(Caches) {
     Cell c;
-    c.source = 10;
-    CHECK(vxMakeString(c.plus(1) << ',' << c.plus(2) << ',' << c.plus(1) << ',' << c.calculated), "11,12,11,2");
-    c.source = 20;
-    CHECK(vxMakeString(c.plus(1) << ',' << c.calculated), "21,3");
-    CHECK(c.sum(1, "abc"), 25);
-    CHECK(c.keyed(3), "xxx");
-    CHECK(c.filled(), "[20,20,20]");
-
-    auto async = [&c] {
-        return vxMakeString(c.later() << ' ' << c.laterInto() << ' ' << c.laterKeyed(4) << ' ' << c.laterPlain(3, 4));
-    };
-    CHECK(async(), "0 0 0 0");
-    CHECK(vesk::RunAsyncCalculations(), 4);
-    CHECK(async(), "21 40 24 12");
     c.source = 30;
-    CHECK(async(), "21 40 24 12");
-    CHECK(vesk::RunAsyncCalculations(), 2);
-    CHECK(async(), "21 60 34 12");
-    CHECK(vesk::RunAsyncCalculations(), 0);
-
     c.sections.read();
     c.EvictDgsNodes();
     CHECK(c.evicted, 2);

@@ -53,53 +53,11 @@ Part MakePart(int32 number, vesk::string8 const& name) {
     return part;
 }
 
-void Fill(Reflected& r) {
-    r.flag = true;
-    r.i8 = -128;
-    r.i64 = INT64_MIN;
-    r.i128 = -int128(~uint128(0) >> 1) - 1;
-    r.u64 = UINT64_MAX;
-    r.u128 = ~uint128(0);
-    r.f32 = 0.1f;
-    r.f64 = -1e300;
-    r.s8 = "a\"\\\n\x01\xc3\xa9\xf0\x9f\x98\x80";
-    r.s16 = {0x41, 0xD83D, 0xDE00, 0xD800};
-    r.colour = shapes::Blue;
-    r.level = shapes::Level::High;
-    const Part part = MakePart(7, "p"), other = MakePart(8, "a much longer name than fits");
-    r.part = part;
-    r.parts = {part, other};
-    r.bits = {true, false, true};
-    r.words = {{"a", "b"}, {}, {"c"}};
-    r.dynamic = {other, part};
-    r.list = {part, other, part};
-    r.bytes = {1, 2, 3};
-    r.deque = {part, other};
-    r.shorts = {4, 5};
-    r.names = {"x", "$y"};
-    r.partSet = {part, other};
-    r.bag = {3, 3, 1};
-    r.wides = {Wide(5), Wide(4)};
-    r.byName["$k"] = part;
-    r.byName[""] = other;
-    r.deep[-4] = {{{"a", 1.5}}, {}};
-    r.byColour[shapes::Green] = 3;
-    r.wideMap[2] = Wide(9);
-    r.byPart[other] = 1;
-    r.byFloat[0.5] = "half";
-    r.trees = {Tree::leaf(1), Tree(), Tree::leaf(3)};
-    r.any = vesk::string8("any");
-    r.typedefd = {6};
-    r.fixed[1] = 9;
-}
+const Part g_part = MakePart(7, "p"), g_other = MakePart(8, "a much longer name than fits");
 
-}
-
-ROW(JsonBothWays) {
-    Reflected r;
-    Fill(r);
-    const vesk::xstring text = Json(r);
-    vesk::xstring expected =
+// A value of each kind.
+vesk::xstring ReflectedText() {
+    vesk::xstring text =
         Q("{'flag':true,'i8':-128,'i16':0,'i64':'-9223372036854775808',"
           "'i128':'-170141183460469231731687303715884105728','u64':'18446744073709551615',"
           "'u128':'340282366920938463463374607431768211455','f32':0.1,'f64':-1e+300,'c8':'a','c16':'b',"
@@ -110,27 +68,36 @@ ROW(JsonBothWays) {
           "'deep':{'-4':[{'a':1.5},{}]},'byColour':{'Green':3},'wideMap':{'2':{'big':'9','small':0}},"
           "'byPart':[[OTHER,1]],'byFloat':[[0.5,'half']],'trees':[{'leaf':1},{'void':null},{'leaf':3}],"
           "'any':{'$type':'string8','$value':'any'},'objects':{},'shared':null,'typedefd':[6],'fixed':[0,9,0]}");
-    auto replace = [&expected](std::string const& name, std::string const& by) {
-        for (std::size_t at; (at = expected.find(name)) != std::string::npos;) expected.replace(at, name.size(), by);
+    auto replace = [&text](std::string const& name, std::string const& by) {
+        for (std::size_t at; (at = text.find(name)) != std::string::npos;) text.replace(at, name.size(), by);
     };
     replace("PART", Q("{'number':7,'name':'p','marks':[1,-2]}"));
     replace("OTHER", Q("{'number':8,'name':'a much longer name than fits','marks':[1,-2]}"));
-    CHECK(text, expected);
+    return text;
+}
 
-    Reflected copy;
-    copy.list = {Part(), Part()};
-    copy.byName["old"] = Part();
-    copy.dynamic = {Part()};
-    CHECK(ErrorOf(copy, text), "none");
-    CHECK(Json(copy), text);
+}
+
+ROW(JsonBothWays) {
+    const vesk::xstring text = ReflectedText();
+    Reflected r;
+    r.list = {Part(), Part()};
+    r.byName["old"] = Part();
+    r.dynamic = {Part()};
+    CHECK(ErrorOf(r, text), "none");
+    CHECK(Json(r), text);
+    CHECK(r.flag && r.i8 == -128 && r.i64 == INT64_MIN && r.i128 == -int128(~uint128(0) >> 1) - 1 && r.u128 == ~uint128(0), true);
+    CHECK(r.f32 == 0.1f && r.f64 == -1e300 && r.s8 == "a\"\\\n\x01\xc3\xa9\xf0\x9f\x98\x80", true);
+    CHECK(r.s16 == (vesk::string16{0x41, 0xD83D, 0xDE00, 0xD800}) && r.colour == shapes::Blue && r.level == shapes::Level::High, true);
     // What was made is what the class itself would have made: it can be used and destroyed as any other.
-    CHECK(copy.list == r.list && copy.deque == r.deque && copy.partSet == r.partSet && copy.bag == r.bag, true);
-    copy.parts.push_back(Part());
-    copy.list.push_back(Part());
-    copy.deque.push_front(Part());
-    copy.byName["new"].marks.push_back(1);
-    copy.dynamic.resize(5);
-    CHECK(copy.partSet.Contains(r.part) && copy.byName.at("$k") == r.part && copy.deep.at(-4)[0].at("a") == 1.5, true);
+    CHECK(r.list == (vesk::xlist<Part>{g_part, g_other, g_part}) && r.deque == (vesk::xdeque<Part>{g_part, g_other}), true);
+    CHECK(r.bits == (vesk::xvector<bool>{true, false, true}) && r.bag == (vesk::xbag<int32>{3, 3, 1}) && r.fixed[1] == 9, true);
+    CHECK(r.partSet.Contains(g_part) && r.byName.at("$k") == g_part && r.deep.at(-4)[0].at("a") == 1.5, true);
+    r.parts.push_back(Part());
+    r.list.push_back(Part());
+    r.deque.push_front(Part());
+    r.byName["new"].marks.push_back(1);
+    r.dynamic.resize(5);
 
     // Indented, and partly.
     Part part = MakePart(1, "n");
@@ -379,7 +346,7 @@ ROW(JsonObjects) {
 
 ROW(Access) {
     Reflected r;
-    Fill(r);
+    vesk::FromJsonText(r, ReflectedText());
     const vesk::Value value = vesk::Value::Of(r);
     CHECK(vxMakeString(value.Count() << value.Name(0) << value.At(1).Text()), "41flag-128");
     CHECK(value.Find("parts[1].marks[0]").As<vesk::int8>(), 1);

@@ -48,40 +48,6 @@ ROW(Chains) {
     CHECK(chain.back().depth.read(), length + 1);
 }
 
-ROW(ManyLinks) {
-    vesk::xvector<Sums> many(100000);
-    Gathers gathers;
-    gathers.many = &many;
-    gathers.rounds = 2;
-    CHECK(IsQuick([&] {
-        for (Sums& one : many) one.x = 1;
-        CHECK(gathers.total.read(), 200000);
-        CHECK(gathers.total.Inputs().size(), 100001);
-        for (int i = 0; i < 5; ++i) {
-            for (Sums& one : many) one.x = 2;
-        }
-        CHECK(gathers.total.read(), 400000);
-    }), true);
-    vesk::xvector<Scales> all(100000);
-    CHECK(IsQuick([&] {
-        for (Scales& one : all) {
-            one.one = &many[0];
-            one.scaled.read();
-        }
-        for (int i = 0; i < 1000; ++i) many[0].x = 3;
-        CHECK(all.back().scaled.read(), 6);
-        CHECK(many[0].x.Dependents().size(), 1);
-        for (Scales& one : all) one.scaled.TryEvict(true);
-    }), true);
-    CHECK(IsQuick([&] {
-        for (int i = 0; i < 20000; ++i) all[0].later(i);
-        CHECK(vesk::RunAsyncCalculations(), 20000);
-        CHECK(all[0].later(7), 20);
-        for (int i = 0; i < 20000; ++i) all[i].later(i);
-        for (int i = 20000; i-- > 0;) all[i] = Scales();
-    }), true);
-}
-
 ROW(ManyWrites) {
     const int count = 20000;
     Field field;

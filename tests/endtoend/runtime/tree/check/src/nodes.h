@@ -65,24 +65,6 @@ $struct Chained {
     mutable int32 calculated = 0;
 };
 
-$struct Gathers {
-    vesk::xvector<Sums>* many = nullptr;
-    $indep int32 rounds;
-    $dep int32 total =
-    {
-        total = 0;
-        for (int i = 0; i < rounds; ++i) {
-            for (Sums const& one : *many) total += one.x;
-        }
-    };
-};
-
-$struct Scales {
-    Sums* one = nullptr;
-    $dep int32 scaled = { scaled = one->x * 2; };
-    $cache <<async>> int32 later(int32 n) const with int32 in = { in = one->x + n; }; { return in * 2; }
-};
-
 $struct+ Field <<-genop>> isa vesk::IObject : model { int32 a; int32 cells[]; xmap<int32,int32> map; kinds::Size size; }
 {
 };

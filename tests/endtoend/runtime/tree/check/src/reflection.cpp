@@ -93,24 +93,6 @@ ROW(Reflection) {
     CHECK(vesk::RegisterReflectedClass(&other, nullptr) == vesk::NSE_ALREADY_DEFINED, true);
 }
 
-ROW(Interfaces) {
-    shapes::Box box, other;
-    const vesk::ptr<shapes::INamedShape> both(&box);
-    const vesk::ptr<shapes::IShape> shape = both;
-    both->Scale(3);
-    shape->size = 4;
-    shape->colour = shapes::Green;
-    shape->named = vesk::ptr<shapes::INamed>(&other);
-    CHECK(both->Area(), 9);
-    CHECK(int32(shape->size), 4);
-    CHECK(vesk::string8(shape->label), "label");
-    CHECK(shape->colour == shapes::Green, true);
-    CHECK(shape->named->Name(), "box");
-    const vesk::ptr<vesk::IObject> object = both;
-    CHECK(object == vesk::ptr<vesk::IObject>(&box), true);
-    CHECK(bool(vesk::ptr<shapes::INamed>()), false);
-}
-
 ROW(Kinds) {
     using kinds::Value;
     vesk::xvector<Value> values;
@@ -178,16 +160,6 @@ ROW(Kinds) {
     kinds::Delegates delegates;
     delegates.m_named = &mixed;
     CHECK(delegates.Name(), "mixed");
-    // What an object throws comes out of its attributes and of whoever calls it for others.
-    Stubborn stubborn;
-    delegates.m_named = &stubborn;
-    const vesk::ptr<shapes::IShape> shape(&stubborn);
-    CHECK(Throws([&] { delegates.Name(); }) && Throws([&] { delegates.m_named->Name(); }), true);
-    CHECK(Throws([&] { shape->size = -1; }) && Throws([&] { shape->named = delegates.m_named; }), true);
-    CHECK(Throws([&] { return vesk::string8(shape->label); }) && Throws([&] { shape->Area(); }), true);
-    shape->size = 3;
-    CHECK(int32(shape->size), 3);
-    CHECK(bool(vesk::ptr<shapes::INamed>(shape->named)), false);
     kinds::TemplateObject<int32> object;
     CHECK(vesk::ptr<shapes::INamed>(&object)->Name(), "template");
 }

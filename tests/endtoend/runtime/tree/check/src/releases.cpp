@@ -3,9 +3,6 @@
 @import "kinds/models.h"
 @import "kinds/remote.h"
 
-#include <atomic>
-#include <thread>
-
 using namespace kinds;
 
 namespace {
@@ -90,22 +87,4 @@ ROW(Releases) {
     vesk::ptr<ICalc>(stub->Interface())->Take(&size);
     server.Serve();
     CHECK(calc.notified, 100);
-}
-
-ROW(Threads) {
-    std::atomic<int> wrong = 0;
-    auto read = [&wrong](bool isOld) {
-        for (int i = 0; i < 300; ++i) {
-            vesk::InputArchive input(isOld ? Joined(g_oldDoc, g_oldSize) : g_newSize);
-            Doc doc;
-            Size size;
-            if (isOld) input >> doc;
-            input >> size;
-            if (input.Remaining() > 0 || (size.level == shapes::Level::High) != isOld) ++wrong;
-        }
-    };
-    std::thread one(read, true), other(read, false);
-    one.join();
-    other.join();
-    CHECK(wrong.load(), 0);
 }

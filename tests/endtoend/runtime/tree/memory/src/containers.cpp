@@ -11,7 +11,6 @@ public:
     $visit { v << others; }
 };
 $struct+ Listed isa vesk::IObject : model { xvector<string8> words; int32 count; } { };
-$struct+ Barred <<-genop>> isa vesk::IObject : model { xvector<string8> words; } { };
 
 namespace {
 
@@ -66,23 +65,6 @@ void ModelVectors(Faults& faults) {
     faults.Expect(changes == seen && !vesk::ModelHook::Any(), "hooks end");
 }
 
-// A hook that erases what stands ahead of the position of a write.
-template <typename Object>
-void ErasingHook(Faults& faults) {
-    Object object;
-    for (int i = 0; i < 4; ++i) object.words.push_back(vesk::string8(40, 'a'));
-    bool isRefused = false;
-    const bool isDone = faults.Try([&] {
-        vesk::ModelHook hook([&](vesk::ModelChange const&) { object.words.model().clear(); });
-        try {
-            object.words.push_back(object.words.read()[3]);
-        } catch (std::out_of_range const&) {
-            isRefused = true;
-        }
-    });
-    faults.Expect(isRefused || !isDone, "a write whose position is gone is refused");
-}
-
 void Hooks(Faults& faults) {
     Listed listed;
     int changes = 0;
@@ -102,5 +84,5 @@ void Hooks(Faults& faults) {
 }
 
 vesk::xvector<Scenario> ContainerScenarios() {
-    return {{"heap", Heap}, {"dynamic arrays", DynamicArrays}, {"model vectors", ModelVectors}, {"hooks", Hooks}, {"erasing hook", ErasingHook<Listed>}, {"erasing hook, no operations", ErasingHook<Barred>}};
+    return {{"heap", Heap}, {"dynamic arrays", DynamicArrays}, {"model vectors", ModelVectors}, {"hooks", Hooks}};
 }

@@ -30,8 +30,6 @@ namespace {
 
 const vesk::string8 g_long(40, 'x');
 
-Item* MakeItem() { return $new Item(); }
-
 Choice MakeTree() {
     const Choice inner = Choice::node({Choice(Choice::inPlace(g_long))});
     return Choice::node({Choice(g_long), inner, Choice(Choice::number(3))});
@@ -150,17 +148,9 @@ void OpenVariants(Faults& faults) {
     faults.Expect(any == before || any.as<Spot>().x == 4, "an openvariant that is read is old or new");
 }
 
-void NewObjects(Faults& faults) {
-    vesk::ObjectHeap& heap = vesk::ObjectHeap::Get();
-    Item* made = nullptr;
-    faults.Try([&] { made = MakeItem(); });
-    faults.Expect(Item::s_count == heap.Count() && heap.Count() == (made ? 1 : 0), "the heap has what was made");
-    heap.Collect({});
-}
-
 }
 
 vesk::xvector<Scenario> ValueScenarios() {
     return {{"archives", Archives}, {"json", Json}, {"values", Values}, {"variants", Variants},
-            {"openvariants", OpenVariants}, {"new objects", NewObjects}};
+            {"openvariants", OpenVariants}};
 }
