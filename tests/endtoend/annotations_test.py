@@ -67,7 +67,7 @@ def checked(text, compiler):
         lambda found: FORMS[compiler].format(next(count), values(found)), text)
 
 
-def members(binary):
+def test_members(binary):
     for keys in (KEY, KEY + "lineDirectives = true "):
         with translated_shop(binary, keys, MAIN, HEADER) as workspace:
             text = workspace.path(f"{OUT}/app/src/shop.h").read_text()
@@ -83,7 +83,7 @@ def members(binary):
                 holds(workspace.shell(f"{compiler} -std=c++20 -fsyntax-only wrong.cpp 2>&1 || true"), " error: ")
 
 
-def same_objects(binary):
+def test_same_objects(binary):
     """A compiler without reflection makes the same of it, debug information apart."""
     workspace, root = translate(binary, "tour.qrws", tree=TOUR / "tree")
     with workspace:
@@ -100,10 +100,9 @@ def same_objects(binary):
         equal([name for name, code in objects[:half] if (name, code) not in objects[half:]], [])
 
 
-def without_the_key(binary):
+def test_without_the_key(binary):
     with translated_shop(binary, "", MAIN, HEADER) as workspace:
         lacks(workspace.path(f"{OUT}/app/src/shop.h").read_text(), "__cpp_impl_reflection")
 
 
-if __name__ == "__main__":
-    run_tests([members, same_objects, without_the_key])
+run_tests(globals())

@@ -117,7 +117,7 @@ def bounded(workspace):
         assert written <= 1 + declarations, f"{path.name}: {written} directives, {declarations} declarations"
 
 
-def every_kind(binary):
+def test_every_kind(binary):
     """All declarations of the tests of the runtime, and the runtime itself: with both compilers, and as many warnings."""
     warnings = []
     for keys in ("", KEY):
@@ -143,7 +143,7 @@ def build(workspace, compiler="g++", switches="-g -O0", program="app"):
     return told
 
 
-def messages(binary):
+def test_messages(binary):
     """A warning, an error, an assertion and a sanitizer name the source, and a run of the tool counts them as without."""
     need("g++")
     place = f"tree/app/src/shop.h:{line_of(SHOP, 'int unused')}"
@@ -162,7 +162,7 @@ def messages(binary):
     equal(counts[1], counts[0])
 
 
-def debugger(binary):
+def test_debugger(binary):
     need("gdb")
     with shop(binary) as workspace:
         build(workspace)
@@ -179,7 +179,7 @@ def debugger(binary):
         lacks(told, "qrexsource")
 
 
-def coverage(binary):
+def test_coverage(binary):
     """Every line that ran is one of the source."""
     need("gcov"), need("clang++")
     for compiler, switches, report in (
@@ -199,7 +199,7 @@ def coverage(binary):
                 assert re.search(rf"^ *{count}\*?: *{number}:", section, re.MULTILINE), f"{compiler}: {text}\n{section[:6000]}"
 
 
-def incremental(binary):
+def test_incremental(binary):
     """Positions are of the text: a file in which only lines have moved is written, and the key itself makes all anew."""
     keys = " fingerprints = true writeTokenEquivalent = false modernCpp = true "
     with shop(binary, keys) as workspace:
@@ -223,4 +223,4 @@ def incremental(binary):
         lacks(output.read_text(), "#line")
 
 
-run_tests([every_kind, messages, debugger, coverage, incremental])
+run_tests(globals())

@@ -41,7 +41,7 @@ def drawn(text):
 
 
 @in_workspace(FILES, "dot")
-def graphs(workspace):
+def test_graphs(workspace):
     """Graphviz draws what the JSON says; a file is found by each of its paths, and --depth ends the way."""
     before = workspace.times("**/*")
     b, a, app, core = "app/src/\u00e4 b.h", "app/src/a.h", "app/src/app.cpp", "core/core.h"
@@ -83,7 +83,7 @@ for name in ("tree/app/src/a.h", "tree/app/src/b.cpp"):
 
 
 @in_workspace(MODELS, "dot")
-def models(workspace):
+def test_models(workspace):
     edges = [("Inner", "n::Plain", "plain"), ("Note", "Inner", "parts"), ("Note", "n::Either", "either"), ("Page", "Note", "model"),
              ("n::Either", "n::Kind", "n::Kind"), ("n::Plain", "n::Kind", "kind")]
     equal(drawn(workspace.run("--graph", "all.qrex", "models")), ({e for edge in edges for e in edge[:2]}, edges))
@@ -115,7 +115,7 @@ $type+ xvector<xvector<int32> >;
 
 
 @in_workspace({**MODELS, "tree/app/src/a.h": REFLECTED, "tree/app/src/app.cpp": '@import "a.h"\nint main() { return 0; }\n'})
-def declarations(workspace):
+def test_declarations(workspace):
     before = workspace.times("**/*")
     text = workspace.run("--reflect", "all.qrex", "--json")
     told = json.loads(text)
@@ -157,7 +157,7 @@ def touch(workspace, name):
 
 
 @in_workspace(FILES, "g++")
-def why_foretells_the_build(workspace):
+def test_why_foretells_the_build(workspace):
     """What it calls stale is what the build then makes, and nothing else, edit by edit; the chain leads to the edit."""
     workspace.write("all.qrex", SETTINGS + "diagnostics = true\n")
     out = "qrexsource/x64/Debug/"
@@ -191,7 +191,7 @@ def why_foretells_the_build(workspace):
 
 @in_workspace({**MODELS, "tree/app/src/a.h": '@import "Vesk/vxObject/IObject.h"\n$enum+ Kind { one };\n', "tree/app/src/b.cpp": "\n",
                "tree/app/src/app.cpp": "int main() { return 0; }\n", "tree/app/src/c.cpp": '@import "a.h"\n'})
-def why_records_move(workspace):
+def test_why_records_move(workspace):
     """A source that is current by itself, and follows from what others declare."""
     workspace.run("all.qrex", "translateOnly=true")
     why = lambda name: workspace.run("--why", name, "all.qrex", "translateOnly=true")
@@ -205,7 +205,7 @@ def why_records_move(workspace):
 
 
 @in_workspace(FILES)
-def what_cannot_be_answered(workspace):
+def test_what_cannot_be_answered(workspace):
     """Bad calls are told with their usage; errors of the workspace as a run tells them; nothing is written."""
     before = workspace.times("**/*")
     for arguments, told in [
@@ -239,4 +239,4 @@ def what_cannot_be_answered(workspace):
     equal(workspace.changed(before, "**/*"), ["tree/core/src/core.qrpj"])
 
 
-run_tests([graphs, models, declarations, why_foretells_the_build, why_records_move, what_cannot_be_answered])
+run_tests(globals())

@@ -82,7 +82,7 @@ def errors(diagnostics):
 
 
 @session()
-def own_errors(client):
+def test_own_errors(client):
     """Errors of our languages at their words, while typing; they go when they are mended, also in what imports the file."""
     client.open(SHAPE)
     client.open(APP)
@@ -107,7 +107,7 @@ def own_errors(client):
 
 
 @session()
-def own_language(client):
+def test_own_language(client):
     client.open(SHAPE)
     client.open(APP)
     at = client.ask("textDocument/definition", client.place(APP, "twice(count)", 2))
@@ -180,18 +180,18 @@ def cpp(client):
 
 
 @session("clangd-19")
-def cpp_in_utf16(client):
+def test_cpp_in_utf16(client):
     cpp(client)
 
 
 @session("clangd-19", encoding="utf-8")
-def cpp_in_utf8(client):
+def test_cpp_in_utf8(client):
     equal(client.capabilities["positionEncoding"], "utf-8")
     cpp(client)
 
 
 @session("clangd-19")
-def dying_clangd(client):
+def test_dying_clangd(client):
     """It is started again, and knows what is open; who had asked is answered."""
     client.open(APP)
     for _ in range(3):
@@ -205,7 +205,7 @@ def dying_clangd(client):
 
 
 @session()
-def rough_client(client):
+def test_rough_client(client):
     """Whatever comes, in whatever order: an answer or nothing, and it goes on."""
     client.open(APP)
     client.send_bytes(b"Content-Length: x\r\n\r\nContent-Length: 3\r\n\r\n{]}Content-Type: y\r\n\r\n" + b"junk" * 3000 + b"\r\n\r\n")
@@ -244,7 +244,7 @@ def state(client):
 
 
 @session()
-def random_edits(client):
+def test_random_edits(client):
     """Whatever the way to them, texts give what they give to a fresh server; and the server does not grow."""
     random = Random(4711)
     client.open(SHAPE)
@@ -276,5 +276,4 @@ def random_edits(client):
     assert sizes[1] < sizes[0] + 10_000, sizes
 
 
-if __name__ == "__main__":
-    run_tests([own_errors, own_language, cpp_in_utf16, cpp_in_utf8, dying_clangd, rough_client, random_edits])
+run_tests(globals())

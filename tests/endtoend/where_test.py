@@ -45,7 +45,7 @@ def filtered(workspace, text, option="--where"):
 
 
 @in_workspace(FILES)
-def there_and_back(workspace):
+def test_there_and_back(workspace):
     """Each line of a source that is copied comes back; what a declaration gives leads to it."""
     workspace.run("all.qrex")
     before = workspace.times("**/*")
@@ -66,7 +66,7 @@ def there_and_back(workspace):
 
 
 @in_workspace(FILES)
-def questions_write_nothing(workspace):
+def test_questions_write_nothing(workspace):
     before = workspace.times("**/*")
     filtered(workspace, f"{OUT}app.cpp:3\n".encode())
     workspace.run("--there", "all.qrex", "tree/app/src/app.cpp:3", status=1)  # it went nowhere yet
@@ -75,7 +75,7 @@ def questions_write_nothing(workspace):
 
 
 @in_workspace(FILES)
-def columns(workspace):
+def test_columns(workspace):
     """They stay with their word; an indentation that came on the way is taken off."""
     workspace.run("all.qrex")
     at = line_with(workspace, OUT + "app.cpp", "local")
@@ -87,7 +87,7 @@ def columns(workspace):
 
 
 @in_workspace(FILES)
-def filter_forms(workspace):
+def test_filter_forms(workspace):
     """All forms of positions, several in a line; whatever else stands there comes out byte for byte."""
     workspace.run("all.qrex")
     folder = str(workspace.folder.resolve())
@@ -116,7 +116,7 @@ def filter_forms(workspace):
 
 
 @in_workspace(FILES)
-def stale(workspace):
+def test_stale(workspace):
     """A text is told to be older than its source, or than what that imports; what was not translated, as well."""
     workspace.run("all.qrex")
     at = line_with(workspace, OUT + "app.cpp", "local")
@@ -131,7 +131,7 @@ def stale(workspace):
 
 
 @in_workspace(FILES)
-def kept_text(workspace):
+def test_kept_text(workspace):
     """A text that stays, since blanks and comments alone differ, is followed as it is: line by line to where its words stand now.
     Kept maps say the same as a translation in memory, and are left out where they are damaged or of another text."""
     for keys in ((), ("positionMaps=true",)):
@@ -165,7 +165,7 @@ def kept_text(workspace):
 
 
 @in_workspace({**FILES, "all.qrex": FILES["all.qrex"] + "fingerprints = true\n"})
-def stale_by_fingerprint(workspace):
+def test_stale_by_fingerprint(workspace):
     workspace.run("all.qrex")
     at = f"{OUT}app.cpp:{line_with(workspace, OUT + 'app.cpp', 'local')}"
     equal(followed(workspace, "--where", at), ["tree/app/src/app.cpp:5"])
@@ -177,7 +177,7 @@ def stale_by_fingerprint(workspace):
 
 
 @in_workspace(FILES)
-def errors(workspace):
+def test_errors(workspace):
     workspace.run("all.qrex")
     holds(workspace.run("--where", "all.qrex", "tree/app/src/app.cpp:3", status=1), "Error: tree/app/src/app.cpp:3 is no position in")
     holds(workspace.run("--there", "all.qrex", "none.h:3", status=1), "Error: none.h:3 is no position in a source")
@@ -188,7 +188,7 @@ def errors(workspace):
 
 
 @in_workspace(FILES)
-def speed(workspace):
+def test_speed(workspace):
     workspace.run("all.qrex")
     text = (f"{OUT}app.cpp:5:3: warning: a variable is not used [-Wunused]\n" + "  a line of no position\n").encode() * 200_000
     began = time.monotonic()
@@ -198,7 +198,7 @@ def speed(workspace):
 
 @in_workspace({**FILES, "tree/app/src/a.h": "// first\n\ninline int twice_as(int unused)\n{\n  return 2;\n}\n",
                "tree/app/src/app.cpp": '@import "a.h"\nint main()\n{\n  return twice_as(1);\n}\n'}, "clang-tidy", "g++", "gdb")
-def real_tools(workspace):
+def test_real_tools(workspace):
     """What clang-tidy and gdb say of generated text, by pipe."""
     workspace.run("all.qrex", "compileCommands=true")
     told = workspace.shell(f"clang-tidy --checks='-*,misc-unused-parameters' --header-filter='.*' {OUT}app.cpp 2>&1 | Qrex --where all.qrex")
@@ -210,4 +210,4 @@ def real_tools(workspace):
     holds(told, "twice_as (unused=1) at tree/app/src/a.h:5", "main () at tree/app/src/app.cpp:4")
 
 
-run_tests([there_and_back, questions_write_nothing, columns, filter_forms, stale, kept_text, stale_by_fingerprint, errors, speed, real_tools])
+run_tests(globals())

@@ -39,7 +39,7 @@ class QrexParserOutputStream : public IOutputStream {
                          const SourceMap& map);
   // From here on the output goes through these, which are not owned and keep the line table.
   void Use(LineDirectives& directives) { m_directives = &directives; }
-  void TellCopies(KeptOutput* kept) { m_kept = kept; }  // the target, if that wants to know; or null
+  void TellCopies(KeptOutput* kept) { m_kept = kept; }   // the target, if that wants to know; or null
   void Write(const void* data, size_t length) override;  // generated text
   void WriteIndented(std::string_view text, size_t blanks, bool atLineStart) override;
   void Flush() override;
