@@ -109,6 +109,16 @@ int64_t Clangd::Ask(const std::string& method, Json params, Answer answer) {
   return id;
 }
 
+void Clangd::AnswerAll() {
+  std::vector<Answer> answers;
+  std::erase_if(m_asked, [&](auto& asked) {
+    if (asked.second.message.is_null()) return false;  // `initialize`
+    answers.push_back(std::move(asked.second.answer));
+    return true;
+  });
+  for (const Answer& answer : answers) answer(nullptr);
+}
+
 void Clangd::Cancel(int64_t id) {
   if (m_asked.contains(id)) Tell("$/cancelRequest", {{"id", id}});
 }

@@ -29,6 +29,7 @@ class Clangd {
   // Answers at once, with null, where it does not run.
   int64_t Ask(const std::string& method, Json params, Answer answer);
   void Cancel(int64_t id);
+  void AnswerAll();  // with null: what was asked is of no use any more
   void Tell(const std::string& method, Json params);
   // What arrived. Notifications and requests of the child go to `other`.
   void Take(int generation, const std::optional<std::string>& body, const std::function<void(const Json&)>& other);

@@ -66,8 +66,10 @@ void Server::LoadWorldFor(const std::string& path) {
 void Server::LoadWorld() {
   m_mustReload = false;
   platform::GoToFolder(FolderOf(m_configuration));
+  if (m_clangd) m_clangd->AnswerAll();  // the answers would be about files of the workspace that goes
   for (auto& [uri, document] : m_documents) document.file = nullptr;
   m_changed.clear();
+  m_unmirrored.clear();
   m_checkedImports.clear();
   m_own.reset();
   m_mapping.reset();
@@ -79,15 +81,16 @@ void Server::LoadWorld() {
   const std::string name = ToolPath(m_configuration, FolderOf(m_configuration));
   if (!m_world->Load(name, m_lines, m_program)) Log(kError, "cannot load " + m_configuration);
   for (auto& [uri, document] : m_documents) {
-    m_texts.Lay(ToolPath(document.path, FolderOf(m_configuration)), document.text.Text());
-    if (m_world->IsLoaded()) document.file = m_world->FindFile(document.path);
+    FindFile(document);
+    m_texts.Lay(TextPath(document), document.text.Text());
     if (document.file) m_changed.insert(document.file);
   }
   if (!m_world->IsLoaded()) return;
-  m_unmirrored.clear();
   for (const auto& project : m_world->Loaded().projects) {
     project->CollectFiles();
-    m_unmirrored.insert(m_unmirrored.end(), project->files.begin(), project->files.end());
+    for (ProjectFile* file : project->files) {
+      if (!m_mirrored.contains(m_world->GeneratedPathOf(*file))) m_unmirrored.push_back(file);
+    }
   }
   WriteCommands(false);
   if (!m_clangd) StartClangd();
@@ -121,13 +124,16 @@ std::string Server::InMirror(std::string word) const {
 void Server::MirrorNext() {
   ProjectFile& file = *m_unmirrored.back();
   m_unmirrored.pop_back();
+  m_mirrored.insert(m_world->GeneratedPathOf(file));
   try {
-    m_world->Mirror(file);
+    if (!DocumentOf(&file)) m_world->MirrorApart(file);
   } catch (const IException& exception) {
     Log(kWarning, ExceptionText(exception));
     m_unmirrored.clear();
   }
-  if (m_unmirrored.empty()) WriteCommands(true);
+  if (!m_unmirrored.empty()) return;
+  m_world->EndMirroring();
+  WriteCommands(true);
 }
 
 void Server::StartClangd() {
@@ -155,6 +161,26 @@ Server::Document* Server::FindDocument(const Json& params) {
   return found == m_documents.end() ? nullptr : &found->second;
 }
 
+Server::Document* Server::DocumentOf(const ProjectFile* file) {
+  const auto found = std::find_if(m_documents.begin(), m_documents.end(),
+                                  [&](const auto& entry) { return file && entry.second.file == file; });
+  return found == m_documents.end() ? nullptr : &found->second;
+}
+
+// The tool knows it by its path without links.
+void Server::FindFile(Document& document) {
+  if (!m_world || !m_world->IsLoaded()) return;
+  document.file = m_world->FindFile(document.path);
+  std::string real;
+  if (!document.file && RealPathOf(document.path, real)) document.file = m_world->FindFile(real);
+  if (document.file) m_mapping->openAddresses[document.file] = document.uri;
+}
+
+// Under the name by which the tool reads it.
+std::string Server::TextPath(const Document& document) const {
+  return document.file ? SourceWorld::SourcePathOf(*document.file) : ToolPath(document.path, FolderOf(m_configuration));
+}
+
 void Server::Open(const Json& params) {
   const std::string uri = TextAt(params, "textDocument/uri");
   const std::string path = PathOfUri(uri);
@@ -166,7 +192,7 @@ void Server::Open(const Json& params) {
   document.version = NumberAt(params, "textDocument/version");
   document.text = TextIndex(TextAt(params, "textDocument/text"));
   LoadWorldFor(path);
-  if (m_world && m_world->IsLoaded()) document.file = m_world->FindFile(path);
+  FindFile(document);
   TextChanged(document);
 }
 
@@ -192,7 +218,7 @@ void Server::Change(const Json& params) {
 
 void Server::TextChanged(Document& document) {
   if (!m_world) return;
-  m_texts.Lay(ToolPath(document.path, FolderOf(m_configuration)), document.text.Text());
+  m_texts.Lay(TextPath(document), document.text.Text());
   if (document.file) m_changed.insert(document.file);
   if (IsProjectText(document)) m_mustReload = true;
 }
@@ -200,13 +226,14 @@ void Server::TextChanged(Document& document) {
 void Server::Close(const Json& params) {
   Document* const document = FindDocument(params);
   if (!document) return;
-  const std::string path = document->path;
+  const std::string path = TextPath(*document);
   ProjectFile* const file = document->file;
+  if (m_mapping) m_mapping->openAddresses.erase(file);
   if (m_clangd && m_world && file) m_clangd->Hide(m_world->GeneratedPathOf(*file));
   Tell("textDocument/publishDiagnostics", {{"uri", document->uri}, {"diagnostics", Json::array()}});
   m_mustReload = m_mustReload || IsProjectText(*document);
   m_documents.erase(document->uri);
-  if (m_world) m_texts.Lift(ToolPath(path, FolderOf(m_configuration)));
+  if (m_world) m_texts.Lift(path);
   if (file) m_changed.insert(file);  // the disk counts again
 }
 
@@ -214,8 +241,8 @@ void Server::Close(const Json& params) {
 void Server::Saved(const std::string& path) {
   if (!m_world || path.empty()) return;
   if (IsProjectPath(path)) m_mustReload = true;
-  if (!m_world->IsLoaded() || m_documents.contains(UriOfPath(path))) return;
-  if (ProjectFile* const file = m_world->FindFile(path)) m_changed.insert(file);
+  ProjectFile* const file = m_world->IsLoaded() ? m_world->FindFile(path) : nullptr;
+  if (file && !DocumentOf(file)) m_changed.insert(file);
 }
 
 // --- Translation
@@ -230,6 +257,7 @@ void Server::BringUpToDate() {
   for (ProjectFile* file : m_changed) {
     m_world->Changed(*file);
     if (file->kind == FileKind::H) headers.insert(file);
+    if (!DocumentOf(file)) m_unmirrored.push_back(file);  // the disk counts
   }
   const bool hasChanged = !m_changed.empty();
   m_changed.clear();
@@ -264,7 +292,7 @@ void Server::ShowImports(Document& document) {
   if (!m_clangd) return;
   for (ProjectFile* import : m_world->ImportsOf(*document.file)) {
     const bool isNew = m_checkedImports.insert(import).second;
-    if (isNew && !m_documents.contains(m_mapping->SourceUri(*import))) m_world->Mirror(*import);
+    if (isNew && !DocumentOf(import)) m_world->Mirror(*import);
   }
 }
 
@@ -272,9 +300,7 @@ void Server::ShowImports(Document& document) {
 
 Json Server::DiagnosticsOf(Document& document) {
   Json all = Json::array();
-  const std::string path =
-      document.file ? SourceWorld::SourcePathOf(*document.file) : ToolPath(document.path, FolderOf(m_configuration));
-  for (const Message& message : m_world->MessagesOf(path)) {
+  for (const Message& message : m_world->MessagesOf(TextPath(document))) {
     const bool isPlaced = message.place.begin >= 0;
     size_t begin = isPlaced ? static_cast<size_t>(message.place.begin) : 0;
     if (!isPlaced && message.place.line > 0) {
@@ -313,9 +339,8 @@ void Server::Publish(Document& document) {
 void Server::PublishTouched() {
   if (!m_world) return;
   for (const std::string& touched : m_world->TakeTouched()) {
-    std::string full;
-    FullPathOf(touched, full);
-    const auto open = m_documents.find(UriOfPath(CollapseDots(full)));
+    const auto open = std::find_if(m_documents.begin(), m_documents.end(),
+                                   [&](const auto& entry) { return TextPath(entry.second) == touched; });
     if (open != m_documents.end()) {
       Publish(open->second);
     } else if (touched.empty()) {
@@ -326,12 +351,10 @@ void Server::PublishTouched() {
 
 void Server::FromClangd(const Json& message) {
   if (TextAt(message, "method") != "textDocument/publishDiagnostics" || !m_world || !m_world->IsLoaded()) return;
-  const ProjectFile* const file = m_mapping->FileAt(TextAt(message, "params/uri"));
-  for (auto& [uri, document] : m_documents) {
-    if (!file || document.file != file) continue;
-    document.clangdDiagnostics = At(message, "params/diagnostics");
-    Publish(document);
-  }
+  Document* const document = DocumentOf(m_mapping->FileAt(TextAt(message, "params/uri")));
+  if (!document) return;
+  document->clangdDiagnostics = At(message, "params/diagnostics");
+  Publish(*document);
 }
 
 }  // namespace qrex::server

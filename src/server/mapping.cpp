@@ -28,7 +28,10 @@ ProjectFile* Mapping::FileAt(const std::string& uri) const {
   return m_world.FindFile(path);
 }
 
-std::string Mapping::SourceUri(const ProjectFile& file) const { return UriOfPath(m_world.SourceFullPathOf(file)); }
+std::string Mapping::SourceUri(const ProjectFile& file) const {
+  const auto open = openAddresses.find(&file);
+  return open != openAddresses.end() ? open->second : UriOfPath(m_world.SourceFullPathOf(file));
+}
 
 std::optional<Position> Mapping::ToGenerated(ProjectFile& file, Position position) {
   const Translated& translated = m_world.TranslationOf(file);

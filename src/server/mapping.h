@@ -2,6 +2,7 @@
 // answers.
 #pragma once
 
+#include <map>
 #include <optional>
 #include <string>
 
@@ -13,7 +14,8 @@ namespace qrex::server {
 class Mapping {
  public:
   explicit Mapping(SourceWorld& world) : m_world(world) {}
-  Columns columns = Columns::Utf16;  // of the editor
+  Columns columns = Columns::Utf16;                         // of the editor
+  std::map<const ProjectFile*, std::string> openAddresses;  // as the editor writes them
 
   // A place of the editor in a file, as clangd counts. Nothing: it has none in the generated text.
   std::optional<Position> ToGenerated(ProjectFile& file, Position position);

@@ -91,8 +91,11 @@ class Server {
   void Publish(Document& document);
   void PublishTouched();
   Json DiagnosticsOf(Document& document);
+  void FindFile(Document& document);  // in the workspace
   Document* FindDocument(const Json& params);
+  Document* DocumentOf(const ProjectFile* file);
   bool IsProjectText(const Document& document) const;
+  std::string TextPath(const Document& document) const;
 
   // --- Features (features.cpp)
   struct Place {
@@ -139,6 +142,7 @@ class Server {
   std::string m_rootFolder;
   std::string m_mirror;                           // of this configuration
   std::vector<ProjectFile*> m_unmirrored;         // of the workspace
+  std::set<std::string> m_mirrored;               // by path: those are there already
   std::map<std::string, Document> m_documents;    // by address
   std::set<ProjectFile*> m_changed;               // since the last translation
   std::set<const ProjectFile*> m_checkedImports;  // whose texts clangd sees as they are

@@ -42,7 +42,10 @@ std::string SettingsText(const std::vector<std::string>& lines) {
 
 }  // namespace
 
-SourceWorld::~SourceWorld() { m_projects.clear(); }
+SourceWorld::~SourceWorld() {
+  m_apart.reset();
+  m_projects.clear();
+}
 
 bool SourceWorld::Load(const std::string& configuration, const std::vector<std::string>& lines,
                        const std::string& program) {
@@ -97,6 +100,7 @@ ProjectFile* SourceWorld::FindGenerated(const std::string& path) const {
 // --- Messages
 
 void SourceWorld::Take(const Message& message) {
+  if (m_isApart) return;
   m_messages[message.place.file].push_back(message);
   m_touched.insert(message.place.file);
 }
@@ -128,6 +132,7 @@ KeepingFiles* SourceWorld::FilesOf(Project& project) {
 }
 
 void SourceWorld::Changed(ProjectFile& changed) {
+  m_apart.reset();  // it knows the text of before
   m_current.erase(&changed);
   ForgetMessages(SourcePathOf(changed));
   for (const auto& [project, files] : m_projects) {
@@ -195,9 +200,34 @@ void SourceWorld::Translate(ProjectFile& file, Translated& translated) {
   }
 }
 
-void SourceWorld::Mirror(ProjectFile& file) {
+void SourceWorld::Mirror(ProjectFile& file) { WriteMirrored(file, TranslationOf(file).generated.Text()); }
+
+void SourceWorld::MirrorApart(ProjectFile& file) {
+  if (m_current.contains(&file)) return Mirror(file);
+  Project& project = *file.project;
+  ProjectConfig* const config = project.FindConfig(m_settings->config, m_settings->platform);
+  if (!config || !IsTranslated(project) || !IsTranslated(file) || !IsTranslatedKind(file.kind)) return;
+  const HeldTrace held;
+  if (!m_apart || &m_apart->project != &project) {
+    m_apart = std::make_unique<KeepingFiles>(*m_settings, project, *config);
+    for (ProjectFile* its : project.files) m_apart->scanned.push_back(&m_apart->GetScannedFile(*its));
+  }
+  const std::unordered_set<std::string> faulty = m_settings->faulty;
+  std::string text;
+  m_isApart = true;
+  try {
+    ScannedFile& scanned = m_apart->GetScannedFile(file);
+    BringUpToDate(scanned);
+    text = m_apart->OutputOf(scanned).Text();
+  } catch (const IException&) {  // told when it is looked at
+  }
+  m_isApart = false;
+  m_settings->faulty = faulty;
+  if (!text.empty()) WriteMirrored(file, text);
+}
+
+void SourceWorld::WriteMirrored(const ProjectFile& file, const std::string& text) const {
   const std::string path = GeneratedPathOf(file);
-  const std::string& text = TranslationOf(file).generated.Text();
   if (!path.starts_with(m_mirror + "/")) return;
   std::string present;
   if (ReadWholeFile(present, path) && present == text) return;

@@ -50,7 +50,10 @@ class SourceWorld : private MessageConsumer {
   // Takes back what the file has declared, and all that imports it: they are translated anew when they are asked for.
   void Changed(ProjectFile& file);
   const Translated& TranslationOf(ProjectFile& file);
-  void Mirror(ProjectFile& file);             // writes the generated text there, if it differs
+  void Mirror(ProjectFile& file);  // writes the generated text there, if it differs
+  // The same of a file that nobody looks at: nothing of it is kept beyond its project, nothing told.
+  void MirrorApart(ProjectFile& file);
+  void EndMirroring() { m_apart.reset(); }
   ScannedFile* ScannedOf(ProjectFile& file);  // in its own project, translated if that is possible; or null
   std::vector<ProjectFile*> ImportsOf(ProjectFile& file);  // of all it sees, as far as is known
 
@@ -63,6 +66,7 @@ class SourceWorld : private MessageConsumer {
   KeepingFiles* FilesOf(Project& project);
   void Translate(ProjectFile& file, Translated& translated);
   void ForgetMessages(const std::string& path);
+  void WriteMirrored(const ProjectFile& file, const std::string& text) const;
 
   OverlaidTexts& m_texts;
   const std::string m_mirror;
@@ -70,6 +74,8 @@ class SourceWorld : private MessageConsumer {
   std::shared_ptr<Workspace> m_workspace;
   std::unordered_map<const Project*, std::unique_ptr<KeepingFiles>> m_projects;  // null: lacks the configuration
   std::unordered_map<const ProjectFile*, std::unique_ptr<Translated>> m_translated;
+  std::unique_ptr<KeepingFiles> m_apart;  // of the project that is mirrored
+  bool m_isApart = false;
   std::set<const ProjectFile*> m_current;  // of these, what is still so
   std::map<std::string, std::vector<Message>> m_messages;
   std::set<std::string> m_touched;
