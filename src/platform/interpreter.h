@@ -8,10 +8,6 @@
 
 namespace qrex::platform {
 
-std::string ForInterpreter(const std::string& line);  // the line as the interpreter of this system reads it
-// The line as a program on PATH and its arguments, if it asks nothing of the interpreter but that: none otherwise, and
-// where that has to say that there is no such program. To start one costs more than most tools take to say no.
-std::vector<std::string> WordsWithoutInterpreter(const std::string& line);
 std::string NameHere(const std::string& tool);  // "gcc-4" is "gcc" where there is no other
 
 }  // namespace qrex::platform

@@ -36,7 +36,7 @@ std::optional<std::string> CapturedText::Take() {
     m_spilled.reset();
   }
   if (!m_isWhole) return std::nullopt;
-  return std::exchange(m_text, {});
+  return TextOfTool(std::exchange(m_text, {}));
 }
 
 // --- Processes

@@ -55,6 +55,8 @@ struct ProcessEnd {
   std::string EndedBy() const;  // "signal 9"
 };
 
+std::string TextOfTool(std::string text);  // as UTF-8, where the system has tools print other texts
+
 // A stream as it was captured.
 class CapturedText {
  public:

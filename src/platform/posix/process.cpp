@@ -87,6 +87,8 @@ int ProcessEnd::InterpreterCode() const {
 
 std::string ProcessEnd::EndedBy() const { return "signal " + std::to_string(code); }
 
+std::string TextOfTool(std::string text) { return text; }
+
 // --- Interrupts
 
 namespace {

@@ -8,7 +8,7 @@ namespace {
 
 constexpr DWORD kChunk = 1 << 16;
 
-bool ReadConsole(HANDLE input, std::string& bytes) {
+bool ReadTyped(HANDLE input, std::string& bytes) {
   std::wstring text(kChunk / sizeof(wchar_t), L'\0');
   DWORD length = 0;
   if (!ReadConsoleW(input, text.data(), static_cast<DWORD>(text.size()), &length, nullptr)) return false;
@@ -23,7 +23,7 @@ bool ReadConsole(HANDLE input, std::string& bytes) {
 bool ReadStdin(std::string& bytes) {
   const HANDLE input = GetStdHandle(STD_INPUT_HANDLE);
   DWORD mode, count = 0;
-  if (GetConsoleMode(input, &mode)) return ReadConsole(input, bytes);
+  if (GetConsoleMode(input, &mode)) return ReadTyped(input, bytes);
   const size_t size = bytes.size();
   bytes.resize(size + kChunk);
   if (!::ReadFile(input, bytes.data() + size, kChunk, &count, nullptr)) count = 0;
