@@ -11,6 +11,7 @@
 #include <string_view>
 
 #include "builder/project_builder.h"
+#include "platform/file_system.h"
 #include "text/files.h"
 #include "workspace/workspace.h"
 
@@ -21,20 +22,27 @@ class OwnFolder {
  public:
   explicit OwnFolder(const std::filesystem::path& parent)
       : m_start(std::filesystem::current_path()), m_path(parent / ("qrex." + std::to_string(getpid()))) {
-    std::filesystem::remove_all(m_path);
+    platform::RemoveTree(m_path.string());
     std::filesystem::create_directories(m_path);
     std::filesystem::current_path(m_path);
   }
   ~OwnFolder() {
     std::error_code ignored;
     std::filesystem::current_path(m_start, ignored);
-    std::filesystem::remove_all(m_path, ignored);
+    platform::RemoveTree(m_path.string());
   }
   OwnFolder(const OwnFolder&) = delete;
 
  private:
   std::filesystem::path m_start, m_path;
 };
+
+// What this system says of an error.
+inline std::string SentenceOf(uint32_t code) {
+  std::string sentence = "no sentence";
+  platform::ErrorSentence(code, sentence);
+  return sentence;
+}
 
 struct World {
   World() {

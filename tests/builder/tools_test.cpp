@@ -8,6 +8,7 @@
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/paths.h"
+#include "tool.h"
 #include "translator/file/translate_file.h"
 #include "workspace/switch_blocks.h"
 #include "world_fixture.h"
@@ -18,7 +19,7 @@ namespace {
 
 class ToolsTest : public WorldTest {
  protected:
-  ToolsTest() : m_path(std::getenv("PATH")) {
+  ToolsTest() {
     settings.platformEnvironments["x64"] = {"tools;/usr/bin;/bin", "", ""};
     ApplyEnvironment(settings.platformEnvironments["x64"]);
     for (const char* tool :
@@ -28,12 +29,6 @@ class ToolsTest : public WorldTest {
               "for word; do case $word in @*) cat < \"${word#@}\" >> log; echo >> log;; esac; done\n"
               "[ ! -f say ] || cat say\n[ ! -f status ] || exit $(cat status)\n");
     }
-  }
-  ~ToolsTest() override { setenv("PATH", m_path.c_str(), 1); }
-
-  static void AddTool(const std::string& name, const std::string& script) {
-    Write("tools/" + name, "#!/bin/sh\n" + script);
-    std::filesystem::permissions("tools/" + name, std::filesystem::perms::owner_all);
   }
   static std::string TakeLog() {
     const std::string log = FileExists("log") ? ReadText("log") : "";
@@ -68,7 +63,7 @@ class ToolsTest : public WorldTest {
   }
 
  private:
-  std::string m_path;
+  const ToolsOnPath m_tools;
 };
 
 // --- Compilers

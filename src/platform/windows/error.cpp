@@ -7,7 +7,8 @@ namespace qrex::platform {
 Result Result::OfSystem(int error) { return Result(static_cast<uint32_t>(error)); }
 Result Result::OfCall(bool isWell) { return isWell ? Result() : Failure(LastError()); }
 
-uint32_t LastError() { return GetLastError(); }
+// What the C library refuses itself has no code of the system.
+uint32_t LastError() { return GetLastError() == 0 ? ERROR_GEN_FAILURE : GetLastError(); }
 
 bool ErrorSentence(uint32_t code, std::string& text) {
   constexpr DWORD kFlags = FORMAT_MESSAGE_ALLOCATE_BUFFER | FORMAT_MESSAGE_FROM_SYSTEM | FORMAT_MESSAGE_IGNORE_INSERTS;

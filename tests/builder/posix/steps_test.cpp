@@ -2,6 +2,7 @@
 
 #include "builder/scheduler.h"
 #include "message_of.h"
+#include "tool.h"
 #include "world_fixture.h"
 
 namespace qrex {
@@ -10,23 +11,14 @@ namespace {
 
 class StepsTest : public WorldTest {
  protected:
-  StepsTest() : m_path(std::getenv("PATH")) {
-    setenv("PATH", ("tools:" + m_path).c_str(), 1);
-    settings.compiler = CompilerKind::gcc;
-  }
-  ~StepsTest() override { setenv("PATH", m_path.c_str(), 1); }
-
-  static void AddTool(const std::string& name, const std::string& script) {
-    Write("tools/" + name, "#!/bin/sh\n" + script);
-    std::filesystem::permissions("tools/" + name, std::filesystem::perms::owner_all);
-  }
+  StepsTest() { settings.compiler = CompilerKind::gcc; }
   CommandResult Run(const Command& command) {
     StartCommand(settings.tools, command);
     return EndCommand(command, *settings.tools.WaitForAny());
   }
 
  private:
-  std::string m_path;
+  const ToolsOnPath m_tools;
 };
 
 // --- Commands
