@@ -15,7 +15,8 @@ inline void AddTool(const std::string& name, const std::string& script) {
 #ifdef QREX_STAND_IN
   const std::string path = "tools/" + name + (name.ends_with(".exe") ? "" : ".exe");
   CreateDirectories(path, false);
-  std::filesystem::copy_file(QREX_STAND_IN, path, std::filesystem::copy_options::overwrite_existing);
+  std::filesystem::remove(path);
+  std::filesystem::copy_file(QREX_STAND_IN, path);
   World::Write(path + ".script", script);
 #else
   World::Write("tools/" + name, "#!/bin/sh\n" + script);

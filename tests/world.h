@@ -4,6 +4,7 @@
 
 #include <unistd.h>
 
+#include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <memory>
@@ -61,8 +62,15 @@ struct World {
 
   static void Write(const std::string& path, std::string_view text) {
     CreateDirectories(path, false);
-    std::filesystem::remove(path);
+    platform::RemoveTree(path);
     std::ofstream(path, std::ios::binary) << text;
+  }
+  // To the tick, also where the standard library keeps seconds.
+  static void SetStamp(const std::string& path, std::filesystem::file_time_type time) {
+    constexpr int64_t kUnixEpoch = 116444736000000000;
+    using Ticks = std::chrono::duration<int64_t, std::ratio<1, 10'000'000>>;
+    const auto sinceEpoch = std::chrono::file_clock::to_sys(time).time_since_epoch();
+    platform::SetWriteTime(path, kUnixEpoch + std::chrono::floor<Ticks>(sinceEpoch).count());
   }
   static std::string Read(const std::string& path) {
     std::string bytes;

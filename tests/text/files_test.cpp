@@ -125,7 +125,7 @@ TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
     paths.push_back(std::to_string(i % 100) + "/" + std::to_string(i / 100));
     if (i % 3 != 0) Write(paths.back(), std::string(i, 'x'));
     if (i % 3 == 1)
-      std::filesystem::last_write_time(paths.back(),
+      SetStamp(paths.back(),
                                        std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
   }
   paths.push_back("1");

@@ -31,7 +31,7 @@ class OutputPolicyTest : public WorldTest {
            std::filesystem::perms::none;
   }
   static void SetAge(const std::string& path, int seconds) {
-    std::filesystem::last_write_time(path,
+    SetStamp(path,
                                      std::filesystem::file_time_type::clock::now() - std::chrono::seconds(seconds));
   }
 };
@@ -153,7 +153,7 @@ TEST_F(OutputPolicyTest, CopiesWhatDiffersWhereStampsAreNear) {
   const auto set = [](const std::string& path, std::chrono::milliseconds behind) {
     const auto second = std::chrono::floor<std::chrono::seconds>(std::filesystem::file_time_type::clock::now());
     const auto even = second - std::chrono::seconds(100 + second.time_since_epoch().count() % 2);
-    std::filesystem::last_write_time(path, even + behind);
+    SetStamp(path, even + behind);
   };
   const struct {
     int source, target;  // milliseconds behind an even second
@@ -187,12 +187,15 @@ TEST_F(OutputPolicyTest, CopiesWhatDiffersWhereStampsAreNear) {
 
 // Of a link, symbolic or a further name, what it leads to stays as it is.
 TEST_F(OutputPolicyTest, ReplacesLinksAlone) {
+  std::string expected;
   for (const bool isSymbolic : {true, false}) {
     for (int way = 0; way < 4; ++way) {
       Write("elsewhere", "theirs");
       SetReadOnly("elsewhere", true);
       if (isSymbolic) {
-        std::filesystem::create_symlink("elsewhere", "out");
+        std::error_code none;  // where the library has no links
+        std::filesystem::create_symlink("elsewhere", "out", none);
+        if (none) continue;
       } else {
         std::filesystem::create_hard_link("elsewhere", "out");
       }
@@ -203,17 +206,18 @@ TEST_F(OutputPolicyTest, ReplacesLinksAlone) {
       }
       if (way == 1) {
         EXPECT_TRUE(DeleteReporting("out"));
+        expected += "Deleting out\n";
       }
       if (way == 2) RemoveLink("out");
       if (way == 3) ChangeReadOnly("out", false);
       EXPECT_EQ("theirs", Read("elsewhere")) << way;
       EXPECT_TRUE(IsReadOnly("elsewhere")) << way;
       EXPECT_EQ(way == 3, std::filesystem::exists("out") && Read("out") == "theirs") << way;
-      std::filesystem::remove("out");
-      std::filesystem::remove("elsewhere");
+      platform::RemoveTree("out");
+      platform::RemoveTree("elsewhere");
     }
   }
-  EXPECT_EQ("Deleting out\nDeleting out\n", trace);
+  EXPECT_EQ(expected, trace);
 }
 
 TEST_F(OutputPolicyTest, Deletes) {

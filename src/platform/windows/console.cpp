@@ -36,11 +36,11 @@ void WriteToConsoleWindow(std::string_view bytes) {
   }
 }
 
-// Whoever reads what was redirected reads it as the console would show it.
+// Whoever reads what was redirected reads it as the console would show it; without a console there is nothing to go by.
 void WriteRedirected(std::string_view bytes) {
   const UINT codePage = GetConsoleOutputCP();
   const auto isAscii = [](char c) { return (c & 0x80) == 0; };
-  if (codePage == CP_UTF8 || std::all_of(bytes.begin(), bytes.end(), isAscii)) return WriteBytes(bytes);
+  if (codePage == 0 || codePage == CP_UTF8 || std::all_of(bytes.begin(), bytes.end(), isAscii)) return WriteBytes(bytes);
   const std::wstring text = Wide(bytes);
   const int length = static_cast<int>(text.size());
   std::string converted(
