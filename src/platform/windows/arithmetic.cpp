@@ -1,4 +1,5 @@
-// The library's functions of doubles are off by a bit in up to every fourth value: those of a wider type, rounded, are not.
+// The library's functions of doubles are off by a bit in up to every fourth value: those of a wider type, rounded, are
+// not.
 
 #include "platform/arithmetic.h"
 

@@ -40,7 +40,8 @@ void WriteToConsoleWindow(std::string_view bytes) {
 void WriteRedirected(std::string_view bytes) {
   const UINT codePage = GetConsoleOutputCP();
   const auto isAscii = [](char c) { return (c & 0x80) == 0; };
-  if (codePage == 0 || codePage == CP_UTF8 || std::all_of(bytes.begin(), bytes.end(), isAscii)) return WriteBytes(bytes);
+  if (codePage == 0 || codePage == CP_UTF8 || std::all_of(bytes.begin(), bytes.end(), isAscii))
+    return WriteBytes(bytes);
   const std::wstring text = Wide(bytes);
   const int length = static_cast<int>(text.size());
   std::string converted(

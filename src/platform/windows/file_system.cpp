@@ -214,7 +214,11 @@ Result RenameFile(const std::string& from, const std::string& to) {
   const DWORD attributes = OwnAttributes(to);
   const bool isHindered =
       attributes != kNone && (attributes & FILE_ATTRIBUTE_DIRECTORY) == 0 && (attributes & kHinders);
-  if (isHindered) SetAttributes(to, attributes & ~kHinders);
+  if (isHindered && IsLink(to)) {  // they belong to what other names lead to
+    if (const Result removed = RemoveFile(to); !removed) return removed;
+  } else if (isHindered) {
+    SetAttributes(to, attributes & ~kHinders);
+  }
   const std::wstring source = WidePath(from), target = WidePath(to);
   const Result renamed = Patiently(
       [&] { return Result::OfCall(MoveFileExW(source.c_str(), target.c_str(), MOVEFILE_REPLACE_EXISTING) != 0); });
@@ -255,7 +259,21 @@ Result FullPath(const std::string& path, std::string& out) {
   return {};
 }
 
+namespace {
+
+bool MayHaveDots(std::string_view path) {
+  if (path.starts_with('.')) return true;
+  for (size_t at = path.find_first_of("/\\"); at < path.size(); at = path.find_first_of("/\\", at + 1)) {
+    const std::string_view behind = path.substr(at + 1);
+    if (path[at] == '\\' || behind.starts_with('.') || behind.starts_with('/')) return true;
+  }
+  return false;
+}
+
+}  // namespace
+
 std::string CollapseDots(std::string_view path) {
+  if (!path.empty() && !MayHaveDots(path)) return std::string(path);
   const std::filesystem::path collapsed = std::filesystem::path(Wide(path)).lexically_normal();
   return PathFrom(collapsed.native());
 }
