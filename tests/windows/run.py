@@ -108,7 +108,7 @@ def tour():
 def compiled(place):
     translated = place / "qrexsource/x64/Debug"
     sources = [path for path in sorted(translated.rglob("*.cpp"))]
-    includes = [f"-I{folder}" for folder in [translated, *sorted({path.parent for path in sources})]]
+    includes = [f"-I{folder}" for folder in [translated, *sorted(path for path in translated.rglob("*") if path.is_dir())]]
     compiler = ["x86_64-w64-mingw32-g++-posix", "-std=c++17", "-O0", "-w", *includes]
 
     def compile_one(source):
