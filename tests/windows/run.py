@@ -9,6 +9,7 @@ import shutil
 import subprocess
 import sys
 import tempfile
+import time
 from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
@@ -16,8 +17,8 @@ ROOT = Path(__file__).resolve().parents[2]
 WINE = "/usr/lib/wine/wine64"
 WRAPPER = str(ROOT / "tests/windows/Qrex")
 SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll", "rpcrt4.dll", "shell32.dll"}
-# End-to-end scripts that need no compiler or shell in the run itself.
-SCRIPTS = ["messages", "generators", "depfile", "questions", "init", "hints", "report"]
+# End-to-end scripts of which tests need no compiler or shell in the run itself.
+SCRIPTS = ["messages", "generators", "questions", "init", "schemas"]
 # What cannot pass under Wine, with the reason.
 KNOWN = dict(line.split(None, 1) for line in (ROOT / "tests/windows/skipped.txt").read_text().splitlines()
              if line and not line.startswith("#"))
@@ -124,6 +125,106 @@ def compiled(place):
     return None if got == expected else f"got\n{got}\nnot\n{expected}"
 
 
+SETTINGS = """virtualTree = { "tree" } workspaces = { "all.qrws" } config = "Debug" platform = "x64"
+$EXPORT_LIB = "out/lib" $EXPORT_TRANSLATED_INCLUDE = "out/include" $EXPORT_UNTRANSLATED_INCLUDE = "out/source" systemName = "Windows"
+PATH("x64") = { "tools" "C:/windows/system32" } INCLUDE("x64") = { "C:/include" } LIB("x64") = { "C:/lib" }
+"""
+
+
+class Tree:
+    """A workspace of so many sources, whose tools are stood for."""
+
+    def __init__(self, build, sources):
+        self.folder = Path(tempfile.mkdtemp(prefix="windows-"))
+        source = self.folder / "tree/app/src"
+        source.mkdir(parents=True)
+        names = ["app.cpp", *(f"s{number}.cpp" for number in range(1, sources))]
+        for name in names:
+            (source / name).write_text("int x;\n")
+        listed = " ".join(f'"{name}"' for name in names)
+        (source / "app.qrpj").write_text('$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "app"\n'
+                                         f'config {{ "Debug|x64" }}\nqrex {{ "src" {{ {listed} }} }}\n')
+        (self.folder / "tree/all.qrws").write_text('"all" { "app" }\n')
+        (self.folder / "all.qrex").write_text(SETTINGS)
+        tools = self.folder / "tools"
+        tools.mkdir()
+        for tool in ("cl", "link", "lib", "mt", "rc", "gcc-4", "g++"):
+            shutil.copy(build / "stand_in.exe", tools / f"{tool}.exe")
+        (tools / "link.exe.script").write_text("touch out/lib/x64/Debug/app.exe\n")
+        (tools / "g++.exe.script").write_text("touch out/lib/x64/Debug/app\n")
+
+    def __enter__(self):
+        return self
+
+    def __exit__(self, *_):
+        shutil.rmtree(self.folder, ignore_errors=True)
+
+    def calls(self, begin):
+        path = self.folder / "log"
+        text = path.read_text(errors="replace") if path.exists() else ""
+        return sum(line.startswith(begin) for line in text.splitlines())
+
+
+def visual_studio(build):
+    with Tree(build, 3) as tree:
+        text = text_of(run([WRAPPER, "all.qrex", "compiler=vc14"], cwd=tree.folder))
+        calls = [tree.calls(begin) for begin in ("cl /c @", "link.exe @", "mt.exe @")]
+        isMarked = (tree.folder / "x64/Debug/app/mt.dep").exists()  # by a batch file, which cmd runs
+        isDone = "\nCompleted.." in text and calls == [3, 1, 1] and isMarked
+        return None if isDone else f"{calls} calls\n{text[-3000:]}"
+
+
+# A hundred compilers at once, each of which takes a while; then what links.
+def many_tools(build):
+    with Tree(build, 100) as tree:
+        (tree.folder / "tools/gcc-4.exe.script").write_text("sleep 20000\n")
+        begin = time.time()
+        text = text_of(run([WRAPPER, "all.qrex", "compiler=gcc", "jobs=100"], cwd=tree.folder))
+        calls = [tree.calls(begin) for begin in ("gcc-4 -c @", "g++ @")]
+        areTogether = time.time() - begin < 200  # one after the other they would take 2000 seconds
+        return None if "\nCompleted.." in text and calls == [100, 1] and areTogether else f"{calls} calls\n{text[-3000:]}"
+
+
+def processes_in(folder):
+    found = []
+    for entry in Path("/proc").glob("[0-9]*"):
+        try:
+            if os.readlink(entry / "cwd") == str(folder) and "wineserver" not in (entry / "cmdline").read_text():
+                found.append(int(entry.name))
+        except OSError:
+            pass
+    return found
+
+
+# A run that is killed leaves no compiler behind.
+def killed_run(build):
+    with Tree(build, 4) as tree:
+        (tree.folder / "tools/gcc-4.exe.script").write_text("sleep 60000\n")
+        started = subprocess.Popen([WRAPPER, "all.qrex", "compiler=gcc", "jobs=3"], cwd=tree.folder, stdin=subprocess.DEVNULL,
+                                   stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+        for _ in range(600):
+            if tree.calls("gcc-4 -c @") == 3:
+                break
+            time.sleep(0.1)
+        before = processes_in(tree.folder)
+        started.kill()
+        started.wait()
+        left = before
+        for _ in range(100):
+            left = processes_in(tree.folder)
+            if not left:
+                break
+            time.sleep(0.1)
+        return None if len(before) >= 4 and not left else f"before: {before}, left: {left}"
+
+
+def builds(build):
+    count = Count("builds with tools that are stood for")
+    for test in (visual_studio, many_tools, killed_run):
+        count.take(test.__name__, test(build))
+    return count
+
+
 def scripts():
     count = Count("end-to-end tests")
     for name in SCRIPTS:
@@ -170,7 +271,8 @@ def cases(folder):
 def main():
     build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
     os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
-    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), tour, scripts]
+    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), tour, lambda: builds(build),
+              scripts]
     if len(sys.argv) > 3 and sys.argv[3]:
         groups.append(lambda: cases(Path(sys.argv[3]).resolve()))
     counts = []

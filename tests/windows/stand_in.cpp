@@ -2,8 +2,8 @@
 // test needs: steps in a row, with "+" between them.
 //
 // Called by another name than its own it is a tool: it notes in `log` how it was called and what its response files
-// hold, prints what is in `say`, and ends with the status in `status`. NAME.script beside it may hold "touch FILE" or
-// "exit N".
+// hold, prints what is in `say`, and ends with the status in `status`. NAME.exe.script beside it may hold "touch FILE",
+// "sleep MILLISECONDS" or "exit N".
 #include <fcntl.h>
 #include <io.h>
 #include <windows.h>
@@ -80,12 +80,13 @@ int PlayTool(const std::string& name, const std::vector<std::string>& words) {
   }
   std::cout << TextOf("say") << std::flush;
   const std::string script = TextOf(OwnPath() + ".script");
+  if (script.starts_with("sleep ")) Sleep(static_cast<DWORD>(std::stoul(script.substr(6))));
   if (script.starts_with("touch ")) std::ofstream(script.substr(6, script.find('\n') - 6)) << "";
   if (const size_t exits = script.find("exit ");
       exits == 0 || (exits != std::string::npos && script[exits - 1] == '\n')) {
     return std::atoi(script.c_str() + exits + 5);
   }
-  return script.starts_with("touch ") ? 0 : std::atoi(TextOf("status").c_str());
+  return script.starts_with("touch ") || script.starts_with("sleep ") ? 0 : std::atoi(TextOf("status").c_str());
 }
 
 }  // namespace

@@ -22,6 +22,14 @@ constexpr DWORD kEndedByInterrupt = 0xC000013A;  // the status of one that Ctrl-
 constexpr DWORD kEndedByUs = 0xC000010A;         // "the process is ending"
 constexpr DWORD kFirstException = 0xC0000000;    // that nobody handled
 
+constexpr int kMoreTries = 5;
+constexpr DWORD kPause = 50;  // milliseconds
+
+// What keeps a process from being made may be over in a moment: a scanner reads the program, or the system is short.
+bool MayPass(DWORD error) {
+  return error == ERROR_SHARING_VIOLATION || error == ERROR_NO_SYSTEM_RESOURCES || error == ERROR_INTERNAL_ERROR;
+}
+
 ProcessEnd Interrupted() { return {Cause::EndedBySignal, SIGINT, {}}; }
 
 ProcessEnd NotStarted(DWORD error, bool isInterpreter) {
@@ -267,10 +275,18 @@ DWORD Processes::Host::Create(const Program& program, const Call& call, Running&
   start.lpAttributeList = inheritance.List();
   constexpr DWORD kFlags = EXTENDED_STARTUPINFO_PRESENT | CREATE_UNICODE_ENVIRONMENT | CREATE_SUSPENDED;
   PROCESS_INFORMATION made;
-  if (!CreateProcessW(Wide(call.program).c_str(), text.data(), nullptr, nullptr, TRUE, kFlags, nullptr, nullptr,
-                      &start.StartupInfo, &made)) {
-    return GetLastError();
+  const std::wstring file = Wide(call.program);
+  const auto create = [&] {
+    return CreateProcessW(file.c_str(), text.data(), nullptr, nullptr, TRUE, kFlags, nullptr, nullptr,
+                          &start.StartupInfo, &made) != 0;
+  };
+  bool isMade = create();
+  for (int i = 0; i < kMoreTries && !isMade && MayPass(GetLastError()); ++i) {
+    Sleep(kPause);
+    isMade = create();
   }
+  if (!isMade) return GetLastError();
+  if (!made.hProcess) return ERROR_BAD_EXE_FORMAT;  // something was started that is none of this system's processes
   const Handle thread(made.hThread);
   running.job.Add(made.hProcess);  // ahead of its first step, so that all that it starts belongs there
   running.Watch(Handle(made.hProcess), m_port.Get());
