@@ -78,6 +78,7 @@ int PlayTool(const std::string& name, const std::vector<std::string>& words) {
   for (const std::string& word : words) {
     if (word.starts_with('@')) log << TextOf(word.substr(1)) << "\n";
   }
+  log.close();
   std::cout << TextOf("say") << std::flush;
   const std::string script = TextOf(OwnPath() + ".script");
   if (script.starts_with("sleep ")) Sleep(static_cast<DWORD>(std::stoul(script.substr(6))));

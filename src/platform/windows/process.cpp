@@ -146,6 +146,7 @@ enum EventKey : ULONG_PTR { kOutputKey, kEndKey };
 class ToolJob {
  public:
   ToolJob() : m_job(CreateJobObjectW(nullptr, nullptr)) { Limit(JOB_OBJECT_LIMIT_KILL_ON_JOB_CLOSE); }
+  HANDLE Get() const { return m_job.Get(); }
   void Add(HANDLE process) { AssignProcessToJobObject(m_job.Get(), process); }
   void End() { TerminateJobObject(m_job.Get(), kEndedByUs); }
   void LeaveTheRest() { Limit(0); }
@@ -191,14 +192,17 @@ class Running {
   HANDLE m_wait = nullptr;
 };
 
-// What of this process a new one inherits: its three streams alone.
+// What a new process is given: of the handles of this one its three streams alone, and the job that it belongs to from
+// its very begin, where the system can do that (Windows 10).
 class Inheritance {
  public:
-  Inheritance(HANDLE input, HANDLE output, HANDLE errors) : m_streams{input, output, errors} {
+  Inheritance(HANDLE input, HANDLE output, HANDLE errors, HANDLE job) : m_streams{input, output, errors}, m_job(job) {
+    constexpr DWORD_PTR kJobList = 0x2000D;  // PROC_THREAD_ATTRIBUTE_JOB_LIST
     SIZE_T size = 0;
-    InitializeProcThreadAttributeList(nullptr, 1, 0, &size);
+    InitializeProcThreadAttributeList(nullptr, 2, 0, &size);
     m_space.resize(size);
-    InitializeProcThreadAttributeList(List(), 1, 0, &size);
+    InitializeProcThreadAttributeList(List(), 2, 0, &size);
+    UpdateProcThreadAttribute(List(), 0, kJobList, &m_job, sizeof m_job, nullptr, nullptr);
     std::sort(m_streams.begin(), m_streams.end());
     const auto end = std::unique(m_streams.begin(), m_streams.end());
     UpdateProcThreadAttribute(List(), 0, PROC_THREAD_ATTRIBUTE_HANDLE_LIST, m_streams.data(),
@@ -211,6 +215,7 @@ class Inheritance {
 
  private:
   std::array<HANDLE, 3> m_streams;
+  HANDLE m_job;
   std::vector<char> m_space;
 };
 
@@ -265,7 +270,8 @@ DWORD Processes::Host::Create(const Program& program, const Call& call, Running&
   const Handle output = takesOutput ? running.output.Open(m_port.Get(), kOutputKey) : Inheritable(STD_OUTPUT_HANDLE);
   const Handle errors = takesErrors ? running.errors.Open(m_port.Get(), kOutputKey) : Inheritable(STD_ERROR_HANDLE);
   if (!input || !output || !errors) return GetLastError();
-  Inheritance inheritance(input.Get(), output.Get(), program.errorsIntoOutput ? output.Get() : errors.Get());
+  Inheritance inheritance(input.Get(), output.Get(), program.errorsIntoOutput ? output.Get() : errors.Get(),
+                          running.job.Get());
   STARTUPINFOEXW start = {};
   start.StartupInfo.cb = sizeof start;
   start.StartupInfo.dwFlags = STARTF_USESTDHANDLES;
@@ -288,7 +294,7 @@ DWORD Processes::Host::Create(const Program& program, const Call& call, Running&
   if (!isMade) return GetLastError();
   if (!made.hProcess) return ERROR_BAD_EXE_FORMAT;  // something was started that is none of this system's processes
   const Handle thread(made.hThread);
-  running.job.Add(made.hProcess);  // ahead of its first step, so that all that it starts belongs there
+  running.job.Add(made.hProcess);  // at the latest, ahead of its first step: all that it starts belongs there
   running.Watch(Handle(made.hProcess), m_port.Get());
   ResumeThread(made.hThread);
   return 0;
