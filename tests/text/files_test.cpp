@@ -124,9 +124,7 @@ TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
   for (int i = 0; i < 1500; ++i) {
     paths.push_back(std::to_string(i % 100) + "/" + std::to_string(i / 100));
     if (i % 3 != 0) Write(paths.back(), std::string(i, 'x'));
-    if (i % 3 == 1)
-      SetStamp(paths.back(),
-                                       std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
+    if (i % 3 == 1) SetStamp(paths.back(), std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
   }
   paths.push_back("1");
   for (const std::string& path : paths) stamps.push_back(StampOf(path));

@@ -31,8 +31,7 @@ class OutputPolicyTest : public WorldTest {
            std::filesystem::perms::none;
   }
   static void SetAge(const std::string& path, int seconds) {
-    SetStamp(path,
-                                     std::filesystem::file_time_type::clock::now() - std::chrono::seconds(seconds));
+    SetStamp(path, std::filesystem::file_time_type::clock::now() - std::chrono::seconds(seconds));
   }
 };
 
