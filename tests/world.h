@@ -4,6 +4,7 @@
 
 #include <unistd.h>
 
+#include <chrono>
 #include <filesystem>
 #include <fstream>
 #include <memory>
@@ -11,6 +12,7 @@
 #include <string_view>
 
 #include "builder/project_builder.h"
+#include "platform/file_system.h"
 #include "text/files.h"
 #include "workspace/workspace.h"
 
@@ -21,20 +23,27 @@ class OwnFolder {
  public:
   explicit OwnFolder(const std::filesystem::path& parent)
       : m_start(std::filesystem::current_path()), m_path(parent / ("qrex." + std::to_string(getpid()))) {
-    std::filesystem::remove_all(m_path);
+    platform::RemoveTree(m_path.string());
     std::filesystem::create_directories(m_path);
     std::filesystem::current_path(m_path);
   }
   ~OwnFolder() {
     std::error_code ignored;
     std::filesystem::current_path(m_start, ignored);
-    std::filesystem::remove_all(m_path, ignored);
+    platform::RemoveTree(m_path.string());
   }
   OwnFolder(const OwnFolder&) = delete;
 
  private:
   std::filesystem::path m_start, m_path;
 };
+
+// What this system says of an error.
+inline std::string SentenceOf(uint32_t code) {
+  std::string sentence = "no sentence";
+  platform::ErrorSentence(code, sentence);
+  return sentence;
+}
 
 struct World {
   World() {
@@ -53,8 +62,15 @@ struct World {
 
   static void Write(const std::string& path, std::string_view text) {
     CreateDirectories(path, false);
-    std::filesystem::remove(path);
+    platform::RemoveTree(path);
     std::ofstream(path, std::ios::binary) << text;
+  }
+  // To the tick, also where the standard library keeps seconds.
+  static void SetStamp(const std::string& path, std::filesystem::file_time_type time) {
+    constexpr int64_t kUnixEpoch = 116444736000000000;
+    using Ticks = std::chrono::duration<int64_t, std::ratio<1, 10'000'000>>;
+    const auto sinceEpoch = std::chrono::file_clock::to_sys(time).time_since_epoch();
+    platform::SetWriteTime(path, kUnixEpoch + std::chrono::floor<Ticks>(sinceEpoch).count());
   }
   static std::string Read(const std::string& path) {
     std::string bytes;

@@ -54,7 +54,7 @@ void ReportAbnormalEnd(std::string_view command, const platform::ProcessEnd& end
   } else if (end.cause == Cause::NotExecutable) {
     trace << " cannot be executed\n";
   } else {
-    trace << " was ended by signal " << end.code << "\n";
+    trace << " was ended by " << end.EndedBy() << "\n";
   }
 }
 

@@ -16,7 +16,8 @@ int main(int argc, char** argv) {
   qrex::platform::SetSignals();
   qrex::platform::TuneHeap();
   qrex::platform::BufferStdout();
-  static auto& commandLine = *new qrex::CommandLine({argv, argv + argc});  // left to the end of the process
+  static auto& commandLine =
+      *new qrex::CommandLine(qrex::platform::CommandLineWords(argc, argv));  // left to the end of the process
   if (!qrex::platform::RunOnStack(kStackSize, [&] { status = commandLine.Run(); })) {
     qrex::WriteToConsole("Error : Not enough memory to run in\n");
   }

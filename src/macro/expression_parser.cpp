@@ -1,8 +1,7 @@
 #include "macro/expression_parser.h"
 
-#include <cmath>
-
 #include "lex/cpp_literals.h"
+#include "platform/arithmetic.h"
 #include "platform/system.h"
 #include "text/numbers.h"
 
@@ -213,10 +212,10 @@ struct ExpressionGrammar {
         {"int", ToInt},
         {"double", ToDouble},
         {"string", ToText},
-        {"sin", Real<std::sin>},
-        {"cos", Real<std::cos>},
-        {"tan", Real<std::tan>},
-        {"exp", Real<std::exp>},
+        {"sin", Real<platform::Sine>},
+        {"cos", Real<platform::Cosine>},
+        {"tan", Real<platform::Tangent>},
+        {"exp", Real<platform::Exponential>},
         {"log", Log},
     };
     const LexToken token = parser.current;
@@ -287,7 +286,7 @@ struct ExpressionGrammar {
       text << "Can't take log of value " << out;
       throw LiteralException(text.TakeText());
     }
-    return Literal::OfFloat(std::log(out));
+    return Literal::OfFloat(platform::Logarithm(out));
   }
 };
 

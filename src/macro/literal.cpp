@@ -4,6 +4,7 @@
 #include <limits>
 
 #include "lex/token.h"
+#include "platform/arithmetic.h"
 #include "text/numbers.h"
 
 namespace qrex {
@@ -331,7 +332,7 @@ Literal ApplyPower(const Literal& left, const Literal& right) {
     text << "Calculation " << base << " ^^ " << exponent << " ill defined";
     Fail(text.TakeText());
   }
-  const double power = std::pow(base, exponent);
+  const double power = platform::Power(base, exponent);
   return BothInt(left, right) ? Literal::OfInt(Truncated(power)) : Literal::OfFloat(power);
 }
 

@@ -36,13 +36,14 @@ constexpr char kBootstrap[] =
 // this process it is what it ever was.
 constexpr char kGuards[] =
     "def guard(name):\n"
-    "    import os, posix\n"
-    "    call, process = getattr(posix, name), os.getpid()\n"
+    "    import os\n"
+    "    system = __import__(os.name)\n"
+    "    call, process = getattr(system, name), os.getpid()\n"
     "    def guarded(*arguments):\n"
     "        if os.getpid() == process:\n"
     "            raise SystemExit('os.%s(%s)' % (name, ', '.join(map(repr, arguments))))\n"
     "        return call(*arguments)\n"
-    "    for module in (os, posix):\n"
+    "    for module in (os, system):\n"
     "        setattr(module, name, guarded)\n"
     "for name in ('_exit', 'execv', 'execve'):\n"
     "    guard(name)\n"

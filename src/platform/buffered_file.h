@@ -2,22 +2,24 @@
 #pragma once
 
 #include <cstdint>
-#include <cstdio>
 #include <string>
 #include <string_view>
 
 #include "platform/error.h"
+#include "platform/streams.h"
 
 namespace qrex::platform {
 
 class BufferedFile {
  public:
   BufferedFile() = default;
-  ~BufferedFile();
+  ~BufferedFile() { Close(); }
   BufferedFile(const BufferedFile&) = delete;
   BufferedFile& operator=(const BufferedFile&) = delete;
 
-  Result Open(const std::string& path, const char* mode);  // "r", "w", "a", "rb", ...; what was open is closed
+  // "r", "w", "a", "rb", ...; what was open is closed. The bytes go through as they are, also where text files have
+  // line ends of their own.
+  Result Open(const std::string& path, const char* mode);
   bool IsOpen() const { return m_stream != nullptr; }
   size_t Read(void* buffer, size_t length);
   Result Write(std::string_view bytes);
@@ -27,7 +29,7 @@ class BufferedFile {
   bool Seek(int64_t position);
 
  private:
-  std::FILE* m_stream = nullptr;
+  CStream m_stream;
 };
 
 }  // namespace qrex::platform

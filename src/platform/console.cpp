@@ -1,17 +1,12 @@
 #include "platform/console.h"
 
-#include <fcntl.h>
-#include <poll.h>
-#include <sys/ioctl.h>
-#include <unistd.h>
-
 #include <algorithm>
 #include <boost/locale/utf.hpp>
-#include <cerrno>
 #include <chrono>
-#include <csignal>
 #include <cstdio>
-#include <cstdlib>
+
+#include "platform/system.h"
+#include "platform/terminal.h"
 
 namespace qrex::platform {
 
@@ -56,15 +51,21 @@ std::string WidenBytes(std::string_view text) {
   return widened;
 }
 
-void FillStandardHandles() {
-  int number;
-  do {
-    number = open("/dev/null", O_RDWR);
-  } while (number >= 0 && number <= STDERR_FILENO);
-  if (number >= 0) close(number);
-}
+namespace {
 
-bool StdoutIsTerminal() { return isatty(STDOUT_FILENO) != 0; }
+// A character of a line that Unicode counts as wide takes two columns. Which ones these are differs from terminal to
+// terminal: what begins where their blocks do counts as wide.
+constexpr utf::code_point kFirstWide = 0x1100;
+
+}  // namespace
+
+size_t ColumnsOf(std::string_view text) {
+  size_t columns = 0;
+  for (const char *at = text.data(), *end = at + text.size(); at < end;) {
+    columns += utf::utf_traits<char>::decode(at, end) < kFirstWide ? 1 : 2;
+  }
+  return columns;
+}
 
 namespace {
 
@@ -76,16 +77,8 @@ bool isBuffered = false;
 std::string buffered;
 Clock::time_point lastWrite;
 
-void WriteAtOnce(std::string_view bytes) {
-  while (!bytes.empty()) {
-    const ssize_t written = write(STDOUT_FILENO, bytes.data(), bytes.size());
-    if (written > 0) bytes.remove_prefix(static_cast<size_t>(written));
-    if (written >= 0 || errno == EINTR) continue;
-    if (errno != EAGAIN) return;
-    pollfd output{STDOUT_FILENO, POLLOUT, 0};  // a pipe that does not block, and is full
-    poll(&output, 1, -1);
-  }
-}
+std::string statusLine;     // empty: none
+bool isWithinLine = false;  // what was written last has no line end
 
 }  // namespace
 
@@ -93,76 +86,24 @@ void BufferStdout() { isBuffered = !StdoutIsTerminal(); }
 
 void FlushStdout() {
   if (buffered.empty()) return;
-  WriteAtOnce(buffered);
+  WriteToOutput(buffered);
   buffered.clear();
   lastWrite = Clock::now();
 }
 
 void FlushAllStreams() { std::fflush(nullptr); }
 
-namespace {
+size_t StatusColumns() { return TakesControlSequences() ? TerminalColumns() : 0; }
 
-constexpr std::string_view kTakeBack = "\r\x1b[K";
-std::string statusLine;     // empty: none
-bool isWithinLine = false;  // what was written last has no line end
+bool StdoutTakesColours() { return TakesControlSequences() && EnvironmentValue("NO_COLOR").value_or("").empty(); }
+
 volatile std::sig_atomic_t isStatusDrawn = 0;
 
-bool TakesControlSequences() {
-  const char* const kind = std::getenv("TERM");
-  return StdoutIsTerminal() && kind && *kind != '\0' && std::string_view(kind) != "dumb";
-}
-
-// A character of a line that Unicode counts as wide takes two columns. Which ones these are differs from terminal to
-// terminal: what begins where their blocks do counts as wide.
-constexpr utf::code_point kFirstWide = 0x1100;
-
-constexpr int kEndingSignals[] = {SIGINT, SIGTERM, SIGHUP, SIGQUIT};
-struct sigaction actionsBefore[std::size(kEndingSignals)];
-
-void EndWithoutStatusLine(int signal) {  // its action is the system's own again
-  if (isStatusDrawn != 0 && write(STDOUT_FILENO, kTakeBack.data(), kTakeBack.size()) < 0) {
-  }
-  raise(signal);
-}
-
-}  // namespace
-
-size_t StatusColumns() {
-  winsize size = {};
-  if (!TakesControlSequences() || ioctl(STDOUT_FILENO, TIOCGWINSZ, &size) != 0) return 0;
-  constexpr size_t kUntold = 80;
-  return size.ws_col == 0 ? kUntold : size.ws_col;
-}
-
-bool StdoutTakesColours() {
-  const char* const refused = std::getenv("NO_COLOR");
-  return TakesControlSequences() && (!refused || *refused == '\0');
-}
-
-size_t ColumnsOf(std::string_view text) {
-  size_t columns = 0;
-  for (const char *at = text.data(), *end = at + text.size(); at < end;) {
-    columns += utf::utf_traits<char>::decode(at, end) < kFirstWide ? 1 : 2;
-  }
-  return columns;
-}
-
-// The signals of the process are those of what it was started with where they are ignored.
-StatusLine::StatusLine() {
-  for (size_t i = 0; i < std::size(kEndingSignals); ++i) {
-    struct sigaction ends = {};
-    ends.sa_handler = EndWithoutStatusLine;
-    ends.sa_flags = static_cast<int>(SA_RESETHAND);
-    sigaction(kEndingSignals[i], nullptr, &actionsBefore[i]);
-    if (actionsBefore[i].sa_handler == SIG_DFL) sigaction(kEndingSignals[i], &ends, nullptr);
-  }
-}
+StatusLine::StatusLine() { WatchEnds(); }
 
 StatusLine::~StatusLine() {
   HideStatusLine();
-  for (size_t i = 0; i < std::size(kEndingSignals); ++i) {
-    if (actionsBefore[i].sa_handler == SIG_DFL) sigaction(kEndingSignals[i], &actionsBefore[i], nullptr);
-  }
+  UnwatchEnds();
 }
 
 void StatusLine::Show(std::string line) {
@@ -171,11 +112,11 @@ void StatusLine::Show(std::string line) {
   statusLine = std::move(line);
   if (isWithinLine) return;  // drawn behind the rest of what is being written
   isStatusDrawn = 1;
-  WriteAtOnce(std::string(kTakeBack) + statusLine);
+  WriteToOutput(std::string(kTakeBack) + statusLine);
 }
 
 void HideStatusLine() {
-  if (isStatusDrawn != 0) WriteAtOnce(kTakeBack);
+  if (isStatusDrawn != 0) WriteToOutput(kTakeBack);
   isStatusDrawn = 0;
   statusLine.clear();
 }
@@ -186,9 +127,9 @@ void WriteStdout(std::string_view bytes) {
     std::string text = std::string(isStatusDrawn != 0 ? kTakeBack : "").append(bytes);
     isStatusDrawn = isWithinLine ? 0 : 1;
     if (!isWithinLine) text += statusLine;
-    return WriteAtOnce(text);
+    return WriteToOutput(text);
   }
-  if (!isBuffered) return WriteAtOnce(bytes);
+  if (!isBuffered) return WriteToOutput(bytes);
   buffered += bytes;
   if (buffered.size() >= kMostBuffered || Clock::now() - lastWrite >= kMoment) FlushStdout();
 }

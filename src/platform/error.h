@@ -6,6 +6,8 @@
 
 namespace qrex::platform {
 
+constexpr intptr_t kNoHandle = -1;  // of the system below: a descriptor, or a HANDLE
+
 constexpr uint32_t kErrorFileNotFound = 2;
 constexpr uint32_t kErrorPathNotFound = 3;
 constexpr uint32_t kErrorAccessDenied = 5;

@@ -2,6 +2,7 @@
 // each other's processes under other numbers or not at all, as in containers that share a folder.
 #pragma once
 
+#include <cstdint>
 #include <string>
 
 #include "platform/error.h"
@@ -22,7 +23,7 @@ class FileClaim {
   static void RemoveAbandoned(const std::string& path);
 
  private:
-  int m_descriptor = -1;
+  intptr_t m_handle = kNoHandle;
 };
 
 }  // namespace qrex::platform

@@ -20,7 +20,7 @@ struct FileInfo {
   bool isDirectory = false;
   bool isPlain = false;  // a file of bytes: no directory, pipe, socket or device
   bool isReadOnly = false;
-  bool isHidden = false;     // the name begins with a dot
+  bool isHidden = false;
   int64_t creationTime = 0;  // all times in 100 ns units since 1601
   int64_t accessTime = 0;
   int64_t writeTime = 0;
@@ -46,11 +46,12 @@ class DirectoryTimes {
   ~DirectoryTimes();
   DirectoryTimes(const DirectoryTimes&) = delete;
   DirectoryTimes& operator=(const DirectoryTimes&) = delete;
-  bool IsOpen() const { return m_descriptor >= 0; }
+  bool IsOpen() const { return m_handle != kNoHandle; }
   FileStamp StampOf(const char* name) const;
 
  private:
-  int m_descriptor;
+  std::string m_directory;  // where the system below has no calls that begin at an open directory
+  intptr_t m_handle;
 };
 
 bool CanRead(const std::string& path);  // a plain file that opens for reading

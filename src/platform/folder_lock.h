@@ -5,6 +5,8 @@
 #include <cstdint>
 #include <string>
 
+#include "platform/error.h"
+
 namespace qrex::platform {
 
 class FolderLock {
@@ -20,7 +22,7 @@ class FolderLock {
   uint64_t Holder() const;  // the process that holds it; 0 where the system does not tell
 
  private:
-  int m_descriptor;
+  const intptr_t m_handle;
 };
 
 }  // namespace qrex::platform

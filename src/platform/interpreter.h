@@ -8,15 +8,6 @@
 
 namespace qrex::platform {
 
-constexpr char kInterpreterPath[] = "/bin/sh";
-std::string ForInterpreter(const std::string& line);  // the line as the shell of this system reads it
-// The line as a program on PATH and its arguments, if it asks nothing of the shell but that: none otherwise, and where
-// the shell has to say that there is no such program. To start a shell costs more than most tools take to say no.
-std::vector<std::string> WordsWithoutInterpreter(const std::string& line);
 std::string NameHere(const std::string& tool);  // "gcc-4" is "gcc" where there is no other
-
-// The batch file that marks a manifest's update is the one that this system has to carry out itself.
-bool IsBatchFile(const std::string& line);
-int RunBatchFile(const std::string& line);  // its exit code
 
 }  // namespace qrex::platform

@@ -1,14 +1,22 @@
-// The job server of a make that runs this program: a pipe with a token for each program that may run beside the first
-// one. MAKEFLAGS names it.
+// The job server of a make that runs this program: a token for each program that may run beside the first one.
+// MAKEFLAGS names it: a pipe, or on Windows a semaphore.
 #pragma once
 
 #include <memory>
 #include <string>
+#include <string_view>
 #include <vector>
 
-#include "platform/descriptor.h"
-
 namespace qrex::platform {
+
+// Where the tokens that nobody has are.
+class TokenPool {
+ public:
+  static std::unique_ptr<TokenPool> Open(std::string_view name);  // as MAKEFLAGS has it; null: it leads to none
+  virtual ~TokenPool() = default;
+  virtual bool TryTake(char& token) = 0;  // at once or not at all
+  virtual void Give(char token) = 0;      // each goes back as it came
+};
 
 class JobServer {
  public:
@@ -23,10 +31,10 @@ class JobServer {
   void KeepTokens(size_t count);  // gives back those that are above it
 
  private:
-  JobServer(Descriptor read, Descriptor write) : m_read(std::move(read)), m_write(std::move(write)) {}
+  explicit JobServer(std::unique_ptr<TokenPool> pool) : m_pool(std::move(pool)) {}
 
-  Descriptor m_read, m_write;
-  std::vector<char> m_tokens;  // each goes back as it came
+  std::unique_ptr<TokenPool> m_pool;
+  std::vector<char> m_tokens;
 };
 
 }  // namespace qrex::platform

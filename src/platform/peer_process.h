@@ -1,4 +1,4 @@
-// A program that talks with this one over its standard input and output, for as long as both like.
+// A program that talks with this one over its standard input and output, for as long as both like. Not on Windows.
 #pragma once
 
 #include <string>

@@ -1,8 +1,9 @@
 // Programs that this one runs, its tools: many at once, what each of them printed, and how it ended as a value.
 //
-// They are started through a process of its own, the keeper (platform/tool_keeper.h), which holds the folder locks of
-// this one while a tool runs, and ends the tools with all that they started when this process is gone, however it
-// ended. So no compiler that outlived its run writes over what a later run made.
+// When this process is gone, however it ended, the tools are ended with all that they started, so that no compiler that
+// outlived its run writes over what a later run made. On POSIX systems a process of its own sees to that, the keeper
+// (platform/posix/tool_keeper.h), which also holds the folder locks of this one while a tool runs; on Windows each tool
+// has a job object.
 //
 // A tool's standard input is empty, and it holds no file that this program opened. What it prints comes through pipes,
 // which are read while anything is waited for: kCapturedInMemory of each stream stays in memory, the rest goes to a
@@ -12,7 +13,6 @@
 
 #include <cstddef>
 #include <cstdint>
-#include <cstdio>
 #include <deque>
 #include <memory>
 #include <optional>
@@ -20,9 +20,9 @@
 #include <string_view>
 #include <vector>
 
-namespace qrex::platform {
+#include "platform/streams.h"
 
-class ToolKeeper;
+namespace qrex::platform {
 
 constexpr size_t kCapturedInMemory = 1 << 20;  // bytes
 
@@ -46,13 +46,16 @@ struct ProcessEnd {
   enum class StartFailure { None, NotFound, TooLong, BadFormat, NoMemory, Other };
 
   Cause cause = Cause::Exited;
-  int code = 0;                               // the exit status, or the signal's number
+  int code = 0;                               // the exit status, or the number of the signal or exception
   StartFailure failure = StartFailure::None;  // of what could not be started at all
 
   bool IsNormal() const { return cause == Cause::Exited; }
   bool IsInterrupt() const;     // by the user, of the tool or, while it ran, of this process
-  int InterpreterCode() const;  // as a command interpreter tells it: 126, 127, 128 and the signal; -1: not started
+  int InterpreterCode() const;  // as this system's interpreter tells it; -1: not started
+  std::string EndedBy() const;  // "signal 9"
 };
+
+std::string TextOfTool(std::string text);  // as UTF-8, where the system has tools print other texts
 
 // A stream as it was captured.
 class CapturedText {
@@ -62,11 +65,8 @@ class CapturedText {
   std::optional<std::string> Take();   // what was spilled is read back; none: a part is lost
 
  private:
-  struct Close {
-    void operator()(std::FILE* file) const { std::fclose(file); }
-  };
   std::string m_text;
-  std::unique_ptr<std::FILE, Close> m_spilled;
+  CStream m_spilled;
   bool m_isWhole = true;
 };
 
@@ -89,31 +89,24 @@ class Processes {
   Processes& operator=(const Processes&) = delete;
 
   Id Start(const Program& program);  // what cannot be started has ended at once, and says so
-  size_t RunningCount() const { return m_running.size(); }
+  size_t RunningCount() const;
   // The next one that has ended, in the order of the ends. None: the time is over, or nothing runs.
   std::optional<Ended> WaitForAny(int milliseconds = kForever);
   Ended Run(const Program& program);  // to its end, whatever else runs
   // Ends what runs, with all that it started: asked first, forced after a moment. WaitForAny tells of each as of any.
   void EndAll();
-  // Ends what runs, and waits until the keeper has released its locks. The next tool finds a new keeper.
+  // Ends what runs, and waits until nothing holds the locks of this process any more but itself.
   void Stop();
 
   static constexpr int kForever = -1;
 
  private:
-  class Running;
-  class InterruptWatch;
+  class Host;  // what the system below has for them
 
-  bool Ask(const Program& program, Running& started, int& error);
-  void ReadAndReap(int milliseconds);
-  void ReapOne();
-  void LoseKeeper();
-  void End(Running& running, ProcessEnd end);
+  void ReadAndReap(int milliseconds);  // waits until something can be read or has ended, once
 
-  std::vector<std::unique_ptr<Running>> m_running;
   std::deque<Ended> m_ended;
-  std::unique_ptr<InterruptWatch> m_interrupts;  // while a tool runs
-  std::unique_ptr<ToolKeeper> m_keeper;  // from the first tool on: it costs as much as a small run without tools
+  std::unique_ptr<Host> m_host;
   Id m_nextId = 0;
 };
 

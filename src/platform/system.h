@@ -6,6 +6,7 @@
 #include <functional>
 #include <optional>
 #include <string>
+#include <vector>
 
 namespace qrex::platform {
 
@@ -17,7 +18,7 @@ std::array<uint8_t, 16> MakeUuid();  // random, in network byte order
 
 std::optional<std::string> EnvironmentValue(const char* name);
 void SetEnvironment(const std::string& name, const std::string& value);
-constexpr char kPathListSeparator = ':';  // between the entries of the process variable PATH
+extern const char kPathListSeparator;  // between the entries of the process variable PATH
 
 // The folder that the process works in, to come back to.
 class WorkingFolder {
@@ -29,12 +30,15 @@ class WorkingFolder {
   void Return() const;
 
  private:
-  const int m_descriptor;
+  const intptr_t m_handle;   // where the system below has one of it
+  const std::string m_path;  // where it has none
 };
 
 bool GoToFolder(const std::string& path);  // the process works there from then on
 [[noreturn]] void EndAtOnce(int status);   // whatever other threads wait for
 
+// The words that this program was called with, as UTF-8.
+std::vector<std::string> CommandLineWords(int count, char** words);
 // Of this program, with symbolic links resolved. Where the system does not tell, it is found by the first word of its
 // command line: a path, or a name on PATH; empty: not found.
 std::string ProgramPath(const std::string& calledAs);
@@ -53,8 +57,8 @@ LocalTime CurrentLocalTime();
 bool RunOnStack(size_t bytes, const std::function<void()>& body);
 // Whether that stack may not hold another level of what is nested. What recurses as deep as its input asks here.
 bool IsStackShort();
-// From now on a write beyond the user's limit of file sizes fails, where it would end the process, and the ends of
-// tools are reported to it.
+// From now on what fails is told to this process, where the system would end it or ask its user: a write beyond the
+// limit of file sizes, a drive without a disk. And so are the ends of tools.
 void SetSignals();
 void TuneHeap();  // for a short run that fills much memory: take it in large steps
 

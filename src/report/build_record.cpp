@@ -72,7 +72,7 @@ void BuildRecord::ToolEnds(ToolId tool, const platform::ProcessEnd& ended) {
   if (!ended.IsNormal() || ended.code != 0) {
     span.hasFailed = true;
     span.failure = ended.cause == platform::ProcessEnd::Cause::EndedBySignal
-                       ? "ended by signal " + std::to_string(ended.code)
+                       ? "ended by " + ended.EndedBy()
                        : "ended with status " + std::to_string(ended.InterpreterCode());
   }
 }

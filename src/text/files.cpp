@@ -399,7 +399,6 @@ const IFileOrDirInfo* FileOrDirIterator::Next() {
     m_state->entryFailure = platform::Stat(m_state->directory + "/" + name, m_state->info.info).Code();
     if (m_state->entryFailure == platform::kErrorFileNotFound) continue;  // gone meanwhile, or a link to nothing
     m_state->info.info.name = name;
-    m_state->info.info.isHidden = name.front() == '.';
     return &m_state->info;
   }
   return nullptr;

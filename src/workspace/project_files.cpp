@@ -4,6 +4,7 @@
 
 #include "lex/literals.h"
 #include "platform/console.h"
+#include "platform/file_names.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
@@ -227,12 +228,17 @@ void ProjectParser::RequireInTree(const std::string& path, const char* position)
 ProjectFile& ProjectParser::AddFile(ProjectFolder& folder, const std::string& path, const std::string& displayName) {
   const auto place = m_project.filesByPath.lower_bound(path);
   if (place != m_project.filesByPath.end() && place->first == path) return *place->second;
+  if (platform::kNamesFoldCase) {
+    if (const auto known = m_foldedPaths.find(platform::FoldCase(path)); known != m_foldedPaths.end())
+      return *known->second;
+  }
   RequireInTree(path, m_entry);
   auto made = std::make_unique<ProjectFile>();
   ProjectFile& file = *made;
   file.project = &m_project;
   file.path = path;
   m_project.filesByPath.emplace_hint(place, file.path, std::move(made));
+  if (platform::kNamesFoldCase) m_foldedPaths.emplace(platform::FoldCase(path), &file);
   file.listedAt = m_entry;
   file.name = displayName;
   if (!StemOf(displayName, file.stem)) file.stem = std::string(FileNameOf(displayName));

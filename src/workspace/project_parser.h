@@ -5,6 +5,7 @@
 #include <set>
 #include <string>
 #include <string_view>
+#include <unordered_map>
 #include <vector>
 
 #include "macro/mpfw_parser.h"
@@ -97,7 +98,8 @@ class ProjectParser : public MpfwParser {
   const char* m_block = nullptr;           // of switches, the last one
   const char* m_blockWithBrace = nullptr;  // in its raw text
   size_t m_depth = 0;
-  const char* m_entry = nullptr;  // of the file tree, which is being read
+  const char* m_entry = nullptr;                                // of the file tree, which is being read
+  std::unordered_map<std::string, ProjectFile*> m_foldedPaths;  // where names fold case
 };
 
 }  // namespace qrex

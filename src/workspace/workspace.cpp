@@ -1,8 +1,10 @@
 #include "workspace/workspace.h"
 
 #include <cstring>
+#include <tuple>
 
 #include "platform/error.h"
+#include "platform/file_names.h"
 #include "platform/system.h"
 #include "text/files.h"
 #include "text/numbers.h"
@@ -20,6 +22,12 @@ std::string StemOrEmpty(std::string_view path) {
   std::string stem;
   StemOf(path, stem);
   return stem;
+}
+
+std::string_view KeptIn(std::pmr::memory_resource& memory, const std::string& text) {
+  char* const kept = static_cast<char*>(memory.allocate(text.size() + 1, 1));
+  std::memcpy(kept, text.c_str(), text.size() + 1);
+  return {kept, text.size()};
 }
 
 }  // namespace
@@ -44,6 +52,7 @@ Project* Workspace::FindSubproject(std::string_view path) const { return FindPro
 
 ProjectFile* Workspace::FindFile(const std::string& path) const {
   auto found = fileMap.find(path);
+  if (found == fileMap.end() && platform::kNamesFoldCase) found = fileMap.find(platform::FoldCase(path));
   return found == fileMap.end() ? nullptr : found->second;
 }
 
@@ -217,7 +226,11 @@ bool Workspace::CheckFileReferences() {
   for (const auto& project : projects) {
     project->CollectFiles();
     for (ProjectFile* file : project->files) {
-      const auto [entry, isNew] = fileMap.emplace(file->path, file);
+      auto [entry, isNew] = fileMap.emplace(file->path, file);
+      if (isNew && platform::kNamesFoldCase) {
+        const std::string_view folded = KeptIn(nodeMemory, platform::FoldCase(file->path));
+        if (folded != file->path) std::tie(entry, isNew) = fileMap.emplace(folded, file);
+      }
       if (isNew) continue;
       const Project& other = *entry->second->project;
       const std::string text =

@@ -41,7 +41,7 @@ class DependencyTest : public WorldTest {
   // Gives a file the time of so many ticks of 100 ns behind a moment of the past.
   static void SetTime(const std::string& path, int64_t ticks) {
     Write(path, "");
-    std::filesystem::last_write_time(path, s_moment + std::chrono::nanoseconds(100 * ticks));
+    SetStamp(path, s_moment + std::chrono::nanoseconds(100 * ticks));
   }
   static int64_t Moment() {
     SetTime("moment", 0);

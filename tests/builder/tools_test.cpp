@@ -188,8 +188,10 @@ TEST_F(ToolsTest, ResultsOfACompiler) {
       {kVisual, "x.cpp\n", "0", true, 0, 0, true},
       {kVisual, "x.cpp(3) : warning C4100: w\n", "2", true, 0, 1, true},
       {kVisual, "x.cpp(3) : error C1: e\nx.cpp(4) : error C2: e\n", "0", false, 2, 0, true},
+#ifndef _WIN32  // where they are codes like others
       {kVisual, "", "127", false, 1, 0, false},
       {kVisual, "x.cpp(3) : error C1: e\n", "139", false, 1, 0, false},
+#endif
       {kGcc, "", "0", true, 0, 0, true},
       {kGcc, "x.cpp:3:5: warning: w\n", "0", true, 0, 1, true},
       {kGcc, "x.cpp:3:5: error: e\n", "1", false, 1, 0, false},

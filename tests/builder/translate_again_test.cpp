@@ -151,7 +151,7 @@ class TranslateAgainTest : public WorldTest {
     std::pair<std::string, std::map<std::string, std::string>> result;
     result.first = ErrorOf([&] { fresh.Build("fresh.qrexdep", nullptr); });
     result.second = Outputs();
-    fs::remove_all("qrexsource");
+    platform::RemoveTree("qrexsource");
     fs::remove("fresh.qrexdep");
     fs::rename("living", "qrexsource");
     return result;

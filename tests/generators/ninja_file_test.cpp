@@ -123,12 +123,14 @@ TEST_F(NinjaFileTest, NoRule) {
       "source\n";
   EXPECT_NE(std::string::npos, trace.find(told)) << trace;
   EXPECT_EQ("build app-Debug: phony x64/Debug/app/a.o", From("build app-Debug:", "\n"));
+#ifndef _WIN32  // where no file has such a name
   Write("tree/app/src/a\nb.cpp", "");
   std::filesystem::remove("build.ninja");
   WriteProject("app", "{ \"src\" { \"*.cpp\" } }");
   Generate("app");
   EXPECT_NE(std::string::npos, trace.find("Error : Ninja files can't have the name app/src/a\nb.cpp - not written\n"));
   EXPECT_FALSE(FileExists("build.ninja"));
+#endif
 }
 
 }  // namespace

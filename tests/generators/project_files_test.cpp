@@ -59,13 +59,13 @@ class ProjectFilesTest : public GenerateTest, public ::testing::WithParamInterfa
 
     std::map<std::string, std::string> expected, generated;
     for (const auto& entry : std::filesystem::directory_iterator(folder)) {
-      std::string& text = expected[entry.path().filename()] = ReadText(entry.path());
+      std::string& text = expected[entry.path().filename().string()] = ReadText(entry.path().string());
       for (const auto& [from, to] : format.differences) ReplaceAllInPlace(text, from, to);
       if (entry.path().filename() != "others.txt") text = WithCarriageReturns(text);
     }
     std::set<std::string> names;
     for (const auto& entry : std::filesystem::directory_iterator(".")) {
-      const std::string name = entry.path().filename();
+      const std::string name = entry.path().filename().string();
       if (entry.is_regular_file() && name.find("make") == std::string::npos) names.insert(name);
     }
     for (const std::string& name : names) {

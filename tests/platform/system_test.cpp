@@ -2,8 +2,10 @@
 
 #include "platform/system.h"
 
+#include <cmath>
 #include <cstdlib>
 
+#include "platform/arithmetic.h"
 #include "platform/console.h"
 #include "platform/error.h"
 #include "platform/file_system.h"
@@ -56,8 +58,18 @@ TEST_F(SystemTest, ErrorCodes) {
   EXPECT_TRUE(RemoveFile(path));
   std::string sentence;
   EXPECT_FALSE(ErrorSentence(12345, sentence));
-  EXPECT_TRUE(ErrorSentence(3, sentence));
-  EXPECT_EQ("The system cannot find the path specified.", sentence);
+}
+
+// The same on every system.
+TEST(ArithmeticTest, Values) {
+  EXPECT_EQ(9.882117688026186, Power(2.5, 2.5));
+  EXPECT_EQ(-15.625, Power(-2.5, 3));
+  EXPECT_EQ(0.0256, Power(-2.5, -4));
+  EXPECT_EQ(1e300, Power(10, 300));
+  EXPECT_TRUE(std::isinf(Power(10, 400)) && std::isnan(Power(-1, 0.5)));
+  EXPECT_EQ(0.1411200080598672, Sine(3));
+  EXPECT_EQ(20.085536923187668, Exponential(3));
+  EXPECT_EQ(1.0986122886681098, Logarithm(3));
 }
 
 TEST(ConsoleTest, Utf8) {

@@ -2,8 +2,6 @@
 
 #include "text/files.h"
 
-#include <sys/stat.h>
-
 #include "platform/error.h"
 #include "platform/system.h"
 #include "text/file_lookup.h"
@@ -120,36 +118,13 @@ TEST_F(FilesTest, Operations) {
   EXPECT_THROW(FileExists("\xff"), StringConversionException);
 }
 
-TEST_F(FilesTest, WhatIsNoPlainFile) {
-  const std::string pipe = "pipe", link = "link";
-  ASSERT_EQ(0, mkfifo(pipe.c_str(), 0666));
-  Write("file", "text");
-  std::filesystem::create_symlink("file", link);
-  FileTimes times;
-  for (const std::string& path : {pipe, std::string("/dev/null")}) {
-    EXPECT_FALSE(FileExists(path) || FileLookup().Exists(path)) << path;
-    EXPECT_EQ(0, LastWriteTime(path)) << path;
-    EXPECT_EQ(0, times.LastWriteTime(path)) << path;
-    EXPECT_EQ("no file " + path, Read(path));
-    EXPECT_FALSE(CopyFile(path, "to", false) || File().Open(path, FileMode::ReadBinary)) << path;
-  }
-  EXPECT_TRUE(FileExists(link) && LastWriteTime(link) != 0);
-  ReplaceFile(pipe, "text");
-  EXPECT_EQ("text", Read(pipe));
-  std::string text = "old";
-  EXPECT_TRUE(LoadStream(text, "/dev/null"));
-  EXPECT_EQ("", text);
-}
-
 TEST_F(FilesTest, TimesOfManyFiles) {  // more than one thread takes at once
   std::vector<std::string> paths;
   std::vector<FileStamp> stamps;
   for (int i = 0; i < 1500; ++i) {
     paths.push_back(std::to_string(i % 100) + "/" + std::to_string(i / 100));
     if (i % 3 != 0) Write(paths.back(), std::string(i, 'x'));
-    if (i % 3 == 1)
-      std::filesystem::last_write_time(paths.back(),
-                                       std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
+    if (i % 3 == 1) SetStamp(paths.back(), std::filesystem::file_time_type::clock::now() - std::chrono::hours(i));
   }
   paths.push_back("1");
   for (const std::string& path : paths) stamps.push_back(StampOf(path));
@@ -194,18 +169,18 @@ TEST_F(FilesTest, FileClass) {
     File none("none", FileMode::ReadText);
     FAIL();
   } catch (const FileException& exception) {
-    EXPECT_EQ("File error (none) : The system cannot find the file specified.", ExceptionText(exception));
+    EXPECT_EQ("File error (none) : " + SentenceOf(2), ExceptionText(exception));
   }
 }
 
 TEST(ExceptionsTest, PrintedForms) {
   EXPECT_EQ("Operating system error : GetLastError() returned 4711", ExceptionText(SystemException(4711)));
-  EXPECT_EQ("File error (p) : The system cannot write to the specified device.", ExceptionText(FileException(29, "p")));
+  EXPECT_EQ("File error (p) : " + SentenceOf(29), ExceptionText(FileException(29, "p")));
   EXPECT_EQ("m", ExceptionText(LiteralException("m")));
   EXPECT_EQ("String conversion failed", ExceptionText(StringConversionException()));
   EXPECT_EQ("Buffer overflow", ExceptionText(BufferOverflowException()));
-  EXPECT_FALSE(FileExists("/none/none"));
-  EXPECT_EQ("Operating system error : The system cannot find the file specified.", ExceptionText(SystemException()));
+  EXPECT_FALSE(FileExists("none"));
+  EXPECT_EQ("Operating system error : " + SentenceOf(2), ExceptionText(SystemException()));
 }
 
 TEST(GuidTest, Texts) {

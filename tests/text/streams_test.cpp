@@ -70,7 +70,7 @@ TEST_F(FileStreamTest, LineEndsInTextMode) {
     OFileStream refused("f", false);
     FAIL();
   } catch (const FileException& exception) {
-    EXPECT_EQ("File error (f) : Access is denied.", ExceptionText(exception));
+    EXPECT_EQ("File error (f) : " + SentenceOf(5), ExceptionText(exception));
   }
   EXPECT_THROW(OFileStream("a\xff", false), StringConversionException);
 }

@@ -18,7 +18,7 @@ const std::string kFolder = QREX_SOURCE_DIR "/tests/translator/cases/";
 std::vector<std::string> CaseNames() {
   std::vector<std::string> names;
   for (const auto& entry : std::filesystem::directory_iterator(kFolder)) {
-    const std::string name = entry.path().filename();
+    const std::string name = entry.path().filename().string();
     if (name.ends_with(".h") && !name.ends_with(".expected.h")) names.push_back(name.substr(0, name.size() - 2));
   }
   std::sort(names.begin(), names.end());

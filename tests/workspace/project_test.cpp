@@ -245,9 +245,11 @@ TEST_F(ProjectTest, Searches) {
   settings.virtualTree = {"tree", "."};
   AssertTree("{ \"..\" { \"h*.h\" } }", "${here.h}");
   settings.virtualTree = {"tree", "more"};
+#ifndef _WIN32  // where names are UTF-16
   std::ofstream("tree/app/s/\xFF.txt");
   AssertTree("{ \"*.cpp\" * }", "app/b.cpp");
   AssertError(std::string(kHeads) + "{ \"*\" * }", "(3) : Path is not valid UTF-8 : app/s/\xFF.txt");
+#endif
 }
 
 TEST_F(ProjectTest, Patterns) {

@@ -12,7 +12,7 @@
 #include <sstream>
 
 #include "platform/file_system.h"
-#include "platform/interpreter.h"
+#include "platform/posix/interpreter.h"
 #include "platform/system.h"
 #include "world_fixture.h"
 

@@ -1,10 +1,11 @@
-#include "platform/interpreter.h"
+#include "platform/posix/interpreter.h"
 
 #include <algorithm>
 #include <iterator>
 #include <string_view>
 
 #include "platform/file_system.h"
+#include "platform/interpreter.h"
 #include "platform/system.h"
 
 namespace qrex::platform {

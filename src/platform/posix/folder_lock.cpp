@@ -13,23 +13,25 @@
 namespace qrex::platform {
 
 FolderLock::FolderLock(const std::string& folder)
-    : m_descriptor(open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)) {}
+    : m_handle(open(folder.c_str(), O_RDONLY | O_DIRECTORY | O_CLOEXEC)) {}
 
 FolderLock::~FolderLock() {
-  if (m_descriptor >= 0) close(m_descriptor);
+  if (m_handle != kNoHandle) close(static_cast<int>(m_handle));
 }
 
-bool FolderLock::TryToTake() { return flock(m_descriptor, LOCK_EX | LOCK_NB) == 0 || errno != EWOULDBLOCK; }
+bool FolderLock::TryToTake() {
+  return flock(static_cast<int>(m_handle), LOCK_EX | LOCK_NB) == 0 || errno != EWOULDBLOCK;
+}
 
 void FolderLock::Take() {
-  while (flock(m_descriptor, LOCK_EX) != 0 && errno == EINTR) {
+  while (flock(static_cast<int>(m_handle), LOCK_EX) != 0 && errno == EINTR) {
   }
 }
 
 // A line of the system's list: "1: FLOCK  ADVISORY  WRITE 1234 fe:00:5678 0 EOF", the folder as device and inode.
 uint64_t FolderLock::Holder() const {
   struct stat status;
-  if (fstat(m_descriptor, &status) != 0) return 0;
+  if (fstat(static_cast<int>(m_handle), &status) != 0) return 0;
   std::ifstream locks("/proc/locks");
   for (std::string line; std::getline(locks, line);) {
     unsigned long long process, inode;

@@ -1,4 +1,4 @@
-#include "platform/tool_keeper.h"
+#include "platform/posix/tool_keeper.h"
 
 #include <dirent.h>
 #include <fcntl.h>

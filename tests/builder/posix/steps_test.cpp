@@ -11,7 +11,7 @@ namespace {
 class StepsTest : public WorldTest {
  protected:
   StepsTest() {
-    setenv("PATH", ("tools:" + std::string(std::getenv("PATH"))).c_str(), 1);
+    PutToolsOnPath();
     settings.compiler = CompilerKind::gcc;
   }
 

@@ -10,18 +10,20 @@
 namespace qrex::platform {
 
 FileClaim::~FileClaim() {
-  if (m_descriptor >= 0) close(m_descriptor);
+  if (m_handle != kNoHandle) close(static_cast<int>(m_handle));
 }
 
 // Between the two calls a sweep may have locked and removed it.
 Result FileClaim::Make(const std::string& path) {
-  m_descriptor = open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
-  if (m_descriptor < 0) return Result::OfCall(false);
-  const bool isTaken = flock(m_descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
+  const int descriptor = open(path.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_CLOEXEC, 0666);
+  if (descriptor < 0) return Result::OfCall(false);
+  const bool isTaken = flock(descriptor, LOCK_EX | LOCK_NB) != 0 && errno == EWOULDBLOCK;
   struct stat status;
-  if (!isTaken && (fstat(m_descriptor, &status) != 0 || status.st_nlink > 0)) return {};
-  close(m_descriptor);
-  m_descriptor = -1;
+  if (!isTaken && (fstat(descriptor, &status) != 0 || status.st_nlink > 0)) {
+    m_handle = descriptor;
+    return {};
+  }
+  close(descriptor);
   return Result::Failure(kErrorFileExists);
 }
 

@@ -101,6 +101,8 @@ std::string PathOnPath(const std::string& program) {
 
 }  // namespace
 
+const char kPathListSeparator = ':';
+
 std::optional<std::string> EnvironmentValue(const char* name) {
   const char* const value = std::getenv(name);
   return value ? std::optional<std::string>(value) : std::nullopt;
@@ -112,13 +114,13 @@ bool GoToFolder(const std::string& path) { return chdir(path.c_str()) == 0; }
 
 void EndAtOnce(int status) { _exit(status); }
 
-WorkingFolder::WorkingFolder() : m_descriptor(open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
+WorkingFolder::WorkingFolder() : m_handle(open(".", O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
 
 WorkingFolder::~WorkingFolder() {
-  if (m_descriptor >= 0) close(m_descriptor);
+  if (m_handle != kNoHandle) close(static_cast<int>(m_handle));
 }
 
-void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(m_descriptor); }
+void WorkingFolder::Return() const { [[maybe_unused]] const int result = fchdir(static_cast<int>(m_handle)); }
 
 size_t ProcessorCount() { return std::max(1u, std::thread::hardware_concurrency()); }
 
@@ -129,6 +131,8 @@ std::string FindProgram(const std::string& calledAs) {
 }
 
 bool CanRun(const std::string& calledAs) { return IsExecutableFile(FindProgram(calledAs)); }
+
+std::vector<std::string> CommandLineWords(int count, char** words) { return {words, words + count}; }
 
 std::string ProgramPath(const std::string& calledAs) {
   std::string path(PATH_MAX, '\0');

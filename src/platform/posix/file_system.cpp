@@ -9,9 +9,10 @@
 #include <algorithm>
 #include <boost/filesystem.hpp>
 #include <cerrno>
-#include <cstdio>
 #include <ctime>
 #include <filesystem>
+
+#include "platform/streams.h"
 
 namespace qrex::platform {
 
@@ -89,15 +90,15 @@ int64_t CurrentStamp() {
 }
 
 DirectoryTimes::DirectoryTimes(const std::string& directory)
-    : m_descriptor(open(directory.empty() ? "." : directory.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
+    : m_handle(open(directory.empty() ? "." : directory.c_str(), O_PATH | O_DIRECTORY | O_CLOEXEC)) {}
 
 DirectoryTimes::~DirectoryTimes() {
-  if (IsOpen()) close(m_descriptor);
+  if (IsOpen()) close(static_cast<int>(m_handle));
 }
 
 FileStamp DirectoryTimes::StampOf(const char* name) const {
   struct stat status;
-  const bool isFile = fstatat(m_descriptor, name, &status, 0) == 0 && S_ISREG(status.st_mode);
+  const bool isFile = fstatat(static_cast<int>(m_handle), name, &status, 0) == 0 && S_ISREG(status.st_mode);
   return isFile ? FileStamp{FileTime(status.st_mtim), static_cast<uint64_t>(status.st_size)} : FileStamp();
 }
 
@@ -168,6 +169,9 @@ Result RemoveFile(const std::string& path) {
   if (!IsLink(path) && IsReadOnlyFile(path)) return Refused();
   return Result::OfCall(unlink(path.c_str()) == 0);
 }
+
+CStream OpenStream(const std::string& path, const char* mode) { return CStream(std::fopen(path.c_str(), mode)); }
+CStream OpenTemporary() { return CStream(std::tmpfile()); }
 
 Result RemoveTree(const std::string& path) {
   boost::system::error_code error;

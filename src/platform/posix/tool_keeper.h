@@ -16,7 +16,7 @@
 #include <string>
 #include <vector>
 
-#include "platform/descriptor.h"
+#include "platform/posix/descriptor.h"
 
 namespace qrex::platform {
 

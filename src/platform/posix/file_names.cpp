@@ -1,0 +1,8 @@
+#include "platform/file_names.h"
+
+namespace qrex::platform {
+
+const bool kNamesFoldCase = false;
+std::string FoldCase(std::string_view path) { return std::string(path); }
+
+}  // namespace qrex::platform

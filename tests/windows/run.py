@@ -1,0 +1,298 @@
+#!/usr/bin/env python3
+"""Runs the tests of the Windows program: run.py BUILD_FOLDER LINUX_BINARY [FOLDER_OF_CASES]
+
+Each group prints how many passed, failed and were skipped, and why. The status is 1 if any failed."""
+
+import os
+import re
+import shutil
+import subprocess
+import sys
+import tempfile
+import time
+from concurrent.futures import ThreadPoolExecutor
+from pathlib import Path
+
+ROOT = Path(__file__).resolve().parents[2]
+WINE = "/usr/lib/wine/wine64"
+WRAPPER = str(ROOT / "tests/windows/Qrex")
+SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll", "rpcrt4.dll", "shell32.dll"}
+# End-to-end scripts of which tests need no compiler or shell in the run itself.
+SCRIPTS = ["generators", "init", "language", "messages", "questions", "schemas"]
+# What cannot pass under Wine, with the reason.
+KNOWN = dict(line.split(None, 1) for line in (ROOT / "tests/windows/skipped.txt").read_text().splitlines()
+             if line and not line.startswith("#"))
+
+
+class Count:
+    def __init__(self, name):
+        self.name, self.passed, self.failed, self.skipped = name, 0, [], []
+
+    def take(self, label, failure):
+        if failure is None:
+            self.passed += 1
+        else:
+            self.failed.append(label)
+            print(f"FAILED {label}\n{failure}", flush=True)
+
+    def skip(self, label, reason):
+        self.skipped.append(label)
+        print(f"skipped {label}: {reason}", flush=True)
+
+    def end(self):
+        print(f"== {self.name}: {self.passed} passed, {len(self.failed)} failed, {len(self.skipped)} skipped", flush=True)
+
+
+def run(command, **options):
+    return subprocess.run(command, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=590,
+                          **options)
+
+
+def text_of(done):
+    return done.stdout.decode(errors="replace").replace("\r", "")
+
+
+def units(build):
+    count = Count("unit tests")
+    for program in sorted(build.glob("*_tests.exe")):
+        text = text_of(run([WINE, str(program)], cwd=build))
+        for label in re.findall(r"^\[       OK \] (\S+)", text, re.M):
+            count.take(label, None)
+        for label in dict.fromkeys(re.findall(r"^\[  FAILED  \] ([\w/]+\.[\w/]+)", text, re.M)):
+            count.take(label, text[-3000:])
+        for label in dict.fromkeys(re.findall(r"^\[  SKIPPED \] ([\w/]+\.[\w/]+) \(", text, re.M)):
+            count.skip(label, "no python27.dll")
+        if not re.search(r"^\[==========\] \d+ tests? from .* ran", text, re.M):
+            count.take(program.name, "It did not come to its end:\n" + text[-3000:])
+    for source in sorted((ROOT / "tests").glob("*/posix/*_test.cpp")):
+        for label in re.findall(r"^TEST(?:_F)?\((\w+, \w+)\)", source.read_text(), re.M):
+            count.skip(label.replace(", ", "."), "of POSIX: shell scripts, pipes and limits in the file system")
+    return count
+
+
+def program(build):
+    count = Count("the program")
+    told = run(["x86_64-w64-mingw32-objdump", "-p", str(build / "Qrex.exe")]).stdout.decode()
+    others = set(name.lower() for name in re.findall(r"DLL Name: (\S+)", told)) - SYSTEM_LIBRARIES
+    count.take("libraries", f"It needs {others}" if others else None)
+    return count
+
+
+def bytes_of_both(binary):
+    count = Count("the same bytes as the binary of this system")
+    text = text_of(run([str(ROOT / "tests/windows/bytes.py"), binary, WRAPPER]))
+    found = re.search(r"^(\d+) passed, (\d+) failed$", text, re.M)
+    count.passed = int(found[1]) if found else 0
+    if not found or found[2] != "0":
+        count.take("bytes.py", text)
+    return count
+
+
+# What the tour and its runtime become is compiled for Windows, and runs.
+def tour():
+    count = Count("an example compiled for Windows")
+    folder = Path(tempfile.mkdtemp(prefix="tour-"))
+    try:
+        shutil.copytree(ROOT / "examples/tour", folder / "examples/tour")
+        shutil.copytree(ROOT / "runtime", folder / "runtime")
+        place = folder / "examples/tour"
+        done = run([WRAPPER, "tour.qrex", "translateOnly=true"], cwd=place)
+        failure = text_of(done) if done.returncode else None
+        if not failure:
+            failure = compiled(place)
+        count.take("tour", failure)
+    finally:
+        shutil.rmtree(folder, ignore_errors=True)
+    return count
+
+
+def compiled(place):
+    translated = place / "qrexsource/x64/Debug"
+    sources = [path for path in sorted(translated.rglob("*.cpp"))]
+    includes = [f"-I{folder}" for folder in [translated, *sorted(path for path in translated.rglob("*") if path.is_dir())]]
+    compiler = ["x86_64-w64-mingw32-g++-posix", "-std=c++17", "-O0", "-w", *includes]
+
+    def compile_one(source):
+        return run([*compiler, "-c", str(source), "-o", str(source) + ".o"], cwd=place)
+    with ThreadPoolExecutor(2) as pool:
+        for done in pool.map(compile_one, sources):
+            if done.returncode:
+                return text_of(done)[:3000]
+    done = run([*compiler, "-static", *[f"{source}.o" for source in sources], "-lws2_32", "-o", "app.exe"], cwd=place)
+    if done.returncode:
+        return text_of(done)[:3000]
+    got, expected = text_of(run([WINE, "app.exe"], cwd=place)), (place / "expected.txt").read_text()
+    return None if got == expected else f"got\n{got}\nnot\n{expected}"
+
+
+SETTINGS = """virtualTree = { "tree" } workspaces = { "all.qrws" } config = "Debug" platform = "x64"
+$EXPORT_LIB = "out/lib" $EXPORT_TRANSLATED_INCLUDE = "out/include" $EXPORT_UNTRANSLATED_INCLUDE = "out/source" systemName = "Windows"
+PATH("x64") = { "tools" "C:/windows/system32" } INCLUDE("x64") = { "C:/include" } LIB("x64") = { "C:/lib" }
+"""
+
+
+class Tree:
+    """A workspace of so many sources, whose tools are stood for."""
+
+    def __init__(self, build, sources):
+        self.folder = Path(tempfile.mkdtemp(prefix="windows-"))
+        source = self.folder / "tree/app/src"
+        source.mkdir(parents=True)
+        names = ["app.cpp", *(f"s{number}.cpp" for number in range(1, sources))]
+        for name in names:
+            (source / name).write_text("int x;\n")
+        listed = " ".join(f'"{name}"' for name in names)
+        (source / "app.qrpj").write_text('$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "app"\n'
+                                         f'config {{ "Debug|x64" }}\nqrex {{ "src" {{ {listed} }} }}\n')
+        (self.folder / "tree/all.qrws").write_text('"all" { "app" }\n')
+        (self.folder / "all.qrex").write_text(SETTINGS)
+        tools = self.folder / "tools"
+        tools.mkdir()
+        for tool in ("cl", "link", "lib", "mt", "rc", "gcc-4", "g++"):
+            shutil.copy(build / "stand_in.exe", tools / f"{tool}.exe")
+        (tools / "link.exe.script").write_text("touch out/lib/x64/Debug/app.exe\n")
+        (tools / "g++.exe.script").write_text("touch out/lib/x64/Debug/app\n")
+
+    def __enter__(self):
+        return self
+
+    def __exit__(self, *_):
+        shutil.rmtree(self.folder, ignore_errors=True)
+
+    def calls(self, begin):
+        path = self.folder / "log"
+        text = path.read_text(errors="replace") if path.exists() else ""
+        return sum(line.startswith(begin) for line in text.splitlines())
+
+
+def visual_studio(build):
+    with Tree(build, 3) as tree:
+        text = text_of(run([WRAPPER, "all.qrex", "compiler=vc14"], cwd=tree.folder))
+        calls = [tree.calls(begin) for begin in ("cl /c @", "link.exe @", "mt.exe @")]
+        isMarked = (tree.folder / "x64/Debug/app/mt.dep").exists()  # by a batch file, which cmd runs
+        isDone = "\nCompleted.." in text and calls == [3, 1, 1] and isMarked
+        return None if isDone else f"{calls} calls\n{text[-3000:]}"
+
+
+# A hundred compilers at once, each of which takes a while; then what links.
+def many_tools(build):
+    with Tree(build, 100) as tree:
+        (tree.folder / "tools/gcc-4.exe.script").write_text("sleep 20000\n")
+        begin = time.time()
+        text = text_of(run([WRAPPER, "all.qrex", "compiler=gcc", "jobs=100"], cwd=tree.folder))
+        calls = [tree.calls(begin) for begin in ("gcc-4 -c @", "g++ @")]
+        areTogether = time.time() - begin < 200  # one after the other they would take 2000 seconds
+        return None if "\nCompleted.." in text and calls == [100, 1] and areTogether else f"{calls} calls\n{text[-3000:]}"
+
+
+def processes_in(folder):
+    found = []
+    for entry in Path("/proc").glob("[0-9]*"):
+        try:
+            if os.readlink(entry / "cwd") == str(folder) and "wineserver" not in (entry / "cmdline").read_text():
+                found.append(int(entry.name))
+        except OSError:
+            pass
+    return found
+
+
+# A run that is killed leaves no compiler behind.
+def killed_run(build):
+    with Tree(build, 4) as tree:
+        (tree.folder / "tools/gcc-4.exe.script").write_text("sleep 60000\n")
+        started = subprocess.Popen([WRAPPER, "all.qrex", "compiler=gcc", "jobs=3"], cwd=tree.folder, stdin=subprocess.DEVNULL,
+                                   stdout=subprocess.DEVNULL, stderr=subprocess.DEVNULL)
+        for _ in range(600):
+            if tree.calls("gcc-4 -c @") == 3:
+                break
+            time.sleep(0.1)
+        before = processes_in(tree.folder)
+        started.kill()
+        started.wait()
+        left = before
+        for _ in range(100):
+            left = processes_in(tree.folder)
+            if not left:
+                break
+            time.sleep(0.1)
+        return None if len(before) >= 4 and not left else f"before: {before}, left: {left}"
+
+
+def builds(build):
+    count = Count("builds with tools that are stood for")
+    for test in (visual_studio, many_tools, killed_run):
+        count.take(test.__name__, test(build))
+    return count
+
+
+def tests_of(script):
+    """The names of its tests, as the closing line of the script lists them, or else by their form."""
+    text = script.read_text()
+    listed = re.search(r"run_tests\(\[?(.*?)\]?\)\s*$", text, re.S)
+    return re.findall(r"\w+", listed[1]) if listed else re.findall(r"^def (test_\w+)", text, re.M)
+
+
+def scripts():
+    count = Count("end-to-end tests")
+    for script in sorted((ROOT / "tests/endtoend").glob("*_test.py")):
+        name = script.stem.removesuffix("_test")
+        tests = tests_of(script)
+        if name not in SCRIPTS:
+            count.skipped += [f"{name}.{test}" for test in tests]
+            print(f"skipped {name}, {len(tests)} tests: they call tools of this system, or ask it for what POSIX has", flush=True)
+            continue
+        for test in tests:
+            label = f"{name}.{test}"
+            if label in KNOWN:
+                count.skip(label, KNOWN[label])
+                continue
+            done = run([sys.executable, str(script), WRAPPER, test])
+            told = re.search(r"(\d+) passed, 0 failed", text_of(done))
+            if told and told[1] == "0":
+                count.skip(label, text_of(done).split("\n")[0])
+            else:
+                count.take(label, None if told else text_of(done)[-3000:])
+    return count
+
+
+def cases(folder):
+    count = Count("cases")
+
+    def play(path):
+        label = str(path.relative_to(folder).with_suffix(""))
+        text = path.read_text(errors="replace")
+        if label in KNOWN:
+            return label, KNOWN[label], None
+        if "#!/bin/sh" in text or "#!/bin/bash" in text:
+            return label, "its tools are shell scripts", None
+        if re.search(r"@(run|eval)?python", text):
+            return label, "no python27.dll", None
+        done = run([sys.executable, str(folder / "run.py"), "--bin", WRAPPER, "--case", label])
+        return label, None, text_of(done) if done.returncode else ""
+    with ThreadPoolExecutor(2) as pool:
+        for label, reason, failure in pool.map(play, sorted(folder.rglob("*.case"))):
+            if reason:
+                count.skip(label, reason)
+            else:
+                count.take(label, failure or None)
+    return count
+
+
+def main():
+    build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
+    os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
+    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), tour, lambda: builds(build),
+              scripts]
+    if len(sys.argv) > 3 and sys.argv[3]:
+        groups.append(lambda: cases(Path(sys.argv[3]).resolve()))
+    counts = []
+    for group in groups:
+        counts.append(group())
+        counts[-1].end()
+    total = [sum(part) for part in zip(*((c.passed, len(c.failed), len(c.skipped)) for c in counts))]
+    print(f"{total[0]} passed, {total[1]} failed, {total[2]} skipped")
+    sys.exit(1 if total[1] else 0)
+
+
+if __name__ == "__main__":
+    main()
