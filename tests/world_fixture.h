@@ -23,8 +23,8 @@ class WorldTest : public ::testing::Test, protected World, public TraceHook {
   void OnTrace(std::string_view text) override { trace += text; }
   std::string TakeTrace() { return std::exchange(trace, {}); }
 
-  // A program that is a script of the shell; tests are free to change PATH. Where a program has to be one for Windows, it
-  // is that of tests/windows/stand_in.cpp, which knows what the scripts of these tests do.
+  // A program that is a script of the shell; tests are free to change PATH. Where a program has to be one for Windows,
+  // it is that of tests/windows/stand_in.cpp, which knows what the scripts of these tests do.
   static void WriteProgram(const std::string& path, const std::string& script) {
 #ifdef QREX_STAND_IN
     const std::string program = path + (path.ends_with(".exe") ? "" : ".exe");

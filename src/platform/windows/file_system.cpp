@@ -142,8 +142,12 @@ Result ReadFile(const std::string& path, std::string& content, Readable kind) {
   }
 }
 
-Result WriteFile(const std::string& path, std::string_view content) {
-  auto create = [&] { return OpenFile(path, GENERIC_WRITE, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL); };
+Result WriteFile(const std::string& path, std::string_view content, Existing existing) {
+  const bool continues = existing == Existing::Continued;
+  const DWORD how = continues ? OPEN_ALWAYS : existing == Existing::Refused ? CREATE_NEW : CREATE_ALWAYS;
+  auto create = [&] {
+    return OpenFile(path, continues ? FILE_APPEND_DATA : GENERIC_WRITE, how, FILE_ATTRIBUTE_NORMAL);
+  };
   Handle file = create();
   if (!file && GetLastError() == ERROR_ACCESS_DENIED) {
     const DWORD attributes = OwnAttributes(path);
