@@ -135,22 +135,25 @@ void SourceWorld::Changed(ProjectFile& changed) {
   m_apart.reset();  // it knows the text of before
   m_current.erase(&changed);
   ForgetMessages(SourcePathOf(changed));
-  for (const auto& [project, files] : m_projects) {
-    if (!files) continue;
-    const auto found = files->scannedByPath.find(changed.path);
-    if (found == files->scannedByPath.end()) continue;
-    for (ScannedFile* file : files->BeginPass({found->second.get()})) {
-      m_current.erase(&file->file);
-      ForgetMessages(file->SourcePath());
-    }
-    std::erase_if(m_current, [&](const ProjectFile* file) {  // what failed has been taken back, too
-      const auto scanned = files->scannedByPath.find(file->path);
-      const bool isGone = scanned != files->scannedByPath.end() && !scanned->second->HasBegun() &&
-                          IsTranslatedKind(file->kind) && file->project == project;
-      if (isGone) ForgetMessages(SourcePathOf(*file));
-      return isGone;
-    });
+  for (const auto& entry : m_projects) {
+    if (entry.second) TakeBack(*entry.second, changed);
   }
+}
+
+void SourceWorld::TakeBack(KeepingFiles& files, const ProjectFile& changed) {
+  const auto found = files.scannedByPath.find(changed.path);
+  if (found == files.scannedByPath.end()) return;
+  for (ScannedFile* file : files.BeginPass({found->second.get()})) {
+    m_current.erase(&file->file);
+    ForgetMessages(file->SourcePath());
+  }
+  std::erase_if(m_current, [&](const ProjectFile* file) {  // what failed has been taken back, too
+    const auto scanned = files.scannedByPath.find(file->path);
+    const bool isGone = scanned != files.scannedByPath.end() && !scanned->second->HasBegun() &&
+                        IsTranslatedKind(file->kind) && file->project == &files.project;
+    if (isGone) ForgetMessages(SourcePathOf(*file));
+    return isGone;
+  });
 }
 
 ScannedFile* SourceWorld::ScannedOf(ProjectFile& file) {

@@ -66,6 +66,7 @@ class SourceWorld : private MessageConsumer {
   KeepingFiles* FilesOf(Project& project);
   void Translate(ProjectFile& file, Translated& translated);
   void ForgetMessages(const std::string& path);
+  void TakeBack(KeepingFiles& files, const ProjectFile& changed);
   void WriteMirrored(const ProjectFile& file, const std::string& text) const;
 
   OverlaidTexts& m_texts;
