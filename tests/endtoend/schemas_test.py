@@ -205,4 +205,32 @@ def test_the_release_of_the_target(workspace):
     holds(workspace.run("all.qrex", status=1), "define the target with 12")
 
 
+@in_workspace(KEYED, "git")
+def test_branches_are_merged(workspace):
+    """Git merges what two branches record of different models; of one release it leaves a conflict, which is told."""
+    git = "git -c user.name=a -c user.email=a@example.org "
+    workspace.write(".gitignore", "qrexsource/\nout/\n")
+    workspace.run("all.qrex")
+    workspace.shell(f"{git} init -q -b one && {git} add . && {git} commit -qm base && {git} checkout -qb two")
+    workspace.edit("tree/app/src/kinds.h", "low, high", "low, high, last")
+    workspace.run("all.qrex")
+    workspace.shell(f"{git} commit -qam two && {git} checkout -q one")
+    workspace.edit("tree/app/src/other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
+    workspace.run("all.qrex")
+    workspace.shell(f"{git} commit -qam one && {git} merge -q two -m both")
+    workspace.run("all.qrex")
+    holds(lock(workspace), "app Other 10 = +b:int32\n", "low:0 high:1 last:2")
+    equal(workspace.shell(f"{git} status --porcelain"), "")
+    workspace.shell(f"{git} checkout -qb three")
+    workspace.edit("tree/app/src/other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; bool c;\n    $schema { 2: +a 10: +b 11: +c")
+    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 11)")
+    workspace.run("all.qrex")
+    workspace.shell(f"{git} commit -qam three && {git} checkout -q one")
+    workspace.edit("tree/app/src/other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; int8 d;\n    $schema { 2: +a 10: +b 11: +d")
+    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 11)")
+    workspace.run("all.qrex")
+    workspace.shell(f"{git} commit -qam four; {git} merge -q three -m all", status=1)
+    holds(workspace.run("all.qrex", status=1), f"{LOCK}(", ") : error : A merge has left a conflict here")
+
+
 run_tests(globals())
