@@ -6,6 +6,7 @@
 #include <thread>
 #include <vector>
 
+#include "platform/file_system.h"
 #include "text/source_texts.h"
 #include "text/stream_adapters.h"
 #include "translator/file/translate_file.h"
@@ -183,7 +184,7 @@ class TranslateAgainTest : public WorldTest {
 
   // Gives how many states of the workspace were sound.
   int Edit(unsigned seed, int edits, Way way) {
-    std::filesystem::remove_all("qrexsource");
+    platform::RemoveTree("qrexsource");
     std::filesystem::remove("app.qrexdep");
     settings.macroWorld.sources = way == Way::Living ? &m_texts : m_disk;
     m_random.seed(seed);
