@@ -74,15 +74,15 @@ def check_groups(editor):
     assert not wrong, "\n".join(wrong)
 
 
-def vim_groups(_binary):
+def test_vim_groups(_binary):
     check_groups("vim")
 
 
-def nvim_groups(_binary):
+def test_nvim_groups(_binary):
     check_groups("nvim")
 
 
-def vim_types_of_files(_binary):
+def test_vim_types_of_files(_binary):
     settings = (ROOT / "templates/workspace/tree/common.inc").read_text()
     files = {"a.qrex": ("", "qrex"), "a.qrws": ("", "qrex"), "a.qrpj": ("", "qrex"), "common.inc": (settings, "qrex"),
              "macros.inc": ("/* b\n*/ @def f(x) =\n{\n    x\n}\n@import \"x.inc\"\nconfig\n{ \"Debug|x64\" }\n", "qrex"),
@@ -96,7 +96,7 @@ def vim_types_of_files(_binary):
             equal(vim_answers(editor, folder, asked), [kind for _, kind in files.values()] + ["yes", "yes", "no"])
 
 
-def vim_reads_the_log(_binary):
+def test_vim_reads_the_log(_binary):
     log = re.sub(r"\x1b\[[\d;]*[A-Za-z]|[^\n]*\r(?!\n)", "", (HERE / "client/terminal.log").read_bytes().decode())
     with tempfile.TemporaryDirectory() as folder:
         Path(folder, "log").write_text(log)
@@ -127,7 +127,7 @@ def session(language):
         yield work, {"cwd": work, "env": variables}
 
 
-def nvim_session(_binary):
+def test_nvim_session(_binary):
     need("nvim")
     steps = ["error wrong cpp", "mapped true v:lua.vim.lsp.omnifunc", "shown // $CLASS WRONG| cpp false", "follows // INT SECOND;|",
              "error wrong qrex", "clients 1", r'options {"arguments": ["config=\"Debug\""]} arguments []', "shown there 1",
@@ -142,7 +142,7 @@ def nvim_session(_binary):
         equal([line for line in output if line.startswith("vim.lsp.start")], ["vim.lsp.start qrex w"] * 2 if newer else [])
 
 
-def nvim_tour(binary):
+def test_nvim_tour(binary):
     """The real server and clangd in Neovim, over examples/tour."""
     need("nvim", "clangd-19")
     server = Path(binary).resolve().parent / "qrex-lsp"
@@ -161,7 +161,7 @@ def nvim_tour(binary):
                    'leads to: order.h int32 pieces : [ unit("piece"), 1 ];', "renamed: orders1::Order first_release;"])
 
 
-def vim_session(_binary):
+def test_vim_session(_binary):
     need("vim")
     if not Path("/usr/share/vim/vimfiles/pack/dist-bundle/opt/ale").is_dir():
         raise Skipped("vim-ale")
@@ -171,7 +171,7 @@ def vim_session(_binary):
         equal((folder / "errors.txt").read_text().splitlines(), ["wrong cpp", "wrong qrex"])
 
 
-def emacs_session(_binary):
+def test_emacs_session(_binary):
     need("emacs", "git")
     eglot = [str(found.parent) for found in Path("/usr/share/emacs/site-lisp/elpa-src").glob("eglot-*/eglot.el")]
     with session("elisp") as (folder, options):
@@ -184,7 +184,7 @@ def emacs_session(_binary):
     equal([lines[1], *lines[3:]], ["qrex-mode", r'(:arguments ["config=\"Debug\""])'])
 
 
-def kate_colours(_binary):
+def test_kate_colours(_binary):
     need("kate-syntax-highlighter")
     with tempfile.TemporaryDirectory() as folder:
         place = Path(folder, "org.kde.syntax-highlighting/syntax/qrex.xml")
@@ -220,7 +220,7 @@ def words_of_tool():
             "<<": table("translator/reader/qualifiers.cpp", r'^      \{"(\w+)", &Q::')}
 
 
-def all_words_have_colours_in_vim(_binary):
+def test_all_words_have_colours_in_vim(_binary):
     groups = {"@": r"qrex(?!Predefined|Operator)\w+", "@=": "qrexPredefined", "$": r"qrex(?!Member|Heading)\w+", "": "qrexKey",
               "<<": "qrexQualifier"}
     forms = {"@": "@%s", "@=": "@%s", "$": "$%s ", "": "%s = 1", "<<": "$class A <<%s>> { };"}
@@ -240,7 +240,7 @@ def all_words_have_colours_in_vim(_binary):
     assert not wrong, "\n".join(wrong)
 
 
-def all_words_are_in_the_grammars(_binary):
+def test_all_words_are_in_the_grammars(_binary):
     rules = {"@": ("macros", "definition variable loop directive python"), "@=": ("macros", "predefined"), "": ("qrex", "key"),
              "$": ("cpp", "heading enumeration calculated words warning"), "<<": ("cpp", "qualifiers")}
     missing = []
@@ -255,7 +255,7 @@ def all_words_are_in_the_grammars(_binary):
     assert not missing, missing
 
 
-def extension(_binary):
+def test_extension(_binary):
     """The grammars and the client, with what `scripts/editors` has installed."""
     need("node", "npm")
     if not (EXTENSION / "node_modules").is_dir():
@@ -263,5 +263,4 @@ def extension(_binary):
     run(["npm", "test", "--silent"], cwd=EXTENSION)
 
 
-run_tests([vim_groups, nvim_groups, nvim_session, nvim_tour, vim_session, emacs_session, kate_colours, vim_types_of_files, vim_reads_the_log, all_words_have_colours_in_vim,
-           all_words_are_in_the_grammars, extension])
+run_tests(globals())
