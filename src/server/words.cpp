@@ -39,6 +39,25 @@ constexpr std::string_view kProjectWords[] = {"qrex",    "config", "subproj", "d
                                               "general", "export", "exclude", "src",         "cpp",
                                               "rc",      "link",   "as"};
 
+// Calls `take` with each token and its place; what it gives is where the next one is looked for. What is no token is
+// passed by.
+template <typename Take>
+void ForEachToken(std::string_view text, Take take) {
+  LexScanner scanner(text, Dialect::Cpp);
+  for (size_t at = 0; at < text.size();) {
+    scanner.begin = text.data() + at;
+    try {
+      const LexToken token = NextToken(scanner);
+      if (token.kind == kEndOfText) return;
+      const auto begin = static_cast<size_t>(token.text.begin - text.data());
+      const auto end = static_cast<size_t>(token.text.end - text.data());
+      at = std::max(take(token.kind, begin, end), at + 1);
+    } catch (const LexScannerException&) {
+      ++at;
+    }
+  }
+}
+
 }  // namespace
 
 Json CompletionInSource(std::string_view text, size_t offset) {
@@ -103,63 +122,40 @@ Json SemanticTokens(const TextIndex& index, Columns columns) {
     }
     last = at;
   };
-  LexScanner scanner(std::string_view(text), Dialect::Cpp);
-  for (size_t at = 0; at < text.size();) {
-    scanner.begin = text.data() + at;
-    LexToken token;
-    try {
-      token = NextToken(scanner);
-    } catch (const LexScannerException&) {
-      at = std::max(at + 1, static_cast<size_t>(scanner.begin - text.data()));
-      continue;
-    }
-    if (token.kind == kEndOfText) break;
-    const auto begin = static_cast<size_t>(token.text.begin - text.data());
-    const auto end = static_cast<size_t>(token.text.end - text.data());
-    at = std::max(end, at + 1);
-    if ((token.kind != kAt && token.kind != kDollar) || end >= text.size()) continue;
-    const bool isVariable = token.kind == kDollar && text[end] == '(';
-    const WordPlace word = WordAt(text, end + (isVariable ? 1 : 0));
-    if (word.begin != end + (isVariable ? 1 : 0) || word.end == word.begin) continue;
+  ForEachToken(text, [&](int32_t kind, size_t begin, size_t end) {
+    if ((kind != kAt && kind != kDollar) || end >= text.size()) return end;
+    const bool isVariable = kind == kDollar && text[end] == '(';
+    const size_t wordBegin = end + (isVariable ? 1 : 0);
+    const WordPlace word = WordAt(text, wordBegin);
+    if (word.begin != wordBegin || word.end == word.begin) return end;
     const std::string_view name = std::string_view(text).substr(word.begin, word.end - word.begin);
     if (isVariable) {
       add(begin, word.end, 2);
-    } else if (token.kind == kDollar) {
+    } else if (kind == kDollar) {
       add(begin, word.end, 1);
     } else if (FindDirective(name)) {
       add(begin, word.end, 0);
     }
-    at = word.end;
-  }
+    return word.end;
+  });
   return data;
 }
 
-// --- Folds: what stands in brackets over several lines, and runs of lines of comment
+// --- Folds: what stands in brackets over several lines
 
 Json FoldingRanges(const TextIndex& index) {
   Json ranges = Json::array();
   const std::string& text = index.Text();
   std::vector<size_t> open;
-  LexScanner scanner(std::string_view(text), Dialect::Cpp);
-  for (size_t at = 0; at < text.size();) {
-    scanner.begin = text.data() + at;
-    LexToken token;
-    try {
-      token = NextToken(scanner);
-    } catch (const LexScannerException&) {
-      at = std::max(at + 1, static_cast<size_t>(scanner.begin - text.data()));
-      continue;
-    }
-    if (token.kind == kEndOfText) break;
-    const auto begin = static_cast<size_t>(token.text.begin - text.data());
-    at = std::max(static_cast<size_t>(token.text.end - text.data()), at + 1);
-    if (token.kind == kOpenBrace) open.push_back(begin);
-    if (token.kind != kCloseBrace || open.empty()) continue;
-    const int64_t first = index.PositionOf(open.back(), Columns::Utf8).line,
-                  line = index.PositionOf(begin, Columns::Utf8).line;
+  ForEachToken(text, [&](int32_t kind, size_t begin, size_t end) {
+    if (kind == kOpenBrace) open.push_back(begin);
+    if (kind != kCloseBrace || open.empty()) return end;
+    const int64_t first = index.PositionOf(open.back(), Columns::Utf8).line;
+    const int64_t line = index.PositionOf(begin, Columns::Utf8).line;
     open.pop_back();
     if (line > first + 1) ranges.push_back({{"startLine", first}, {"endLine", line - 1}});
-  }
+    return end;
+  });
   return ranges;
 }
 
