@@ -224,6 +224,11 @@ class TranslateAgainTest : public WorldTest {
     }
     return sound;
   }
+  int EditSeeds(Way way) {
+    int sound = 0;
+    for (unsigned seed = 1; seed <= 6; ++seed) sound += Edit(seed, 60, way);
+    return sound;
+  }
 
  protected:
   const SourceTexts* const m_disk = settings.macroWorld.sources;
@@ -235,13 +240,9 @@ class TranslateAgainTest : public WorldTest {
   std::mt19937 m_random{1};
 };
 
-TEST_F(TranslateAgainTest, IsWhatAFreshBuildWouldBe) {
-  for (const Way way : {Way::Living, Way::RunAfterRun}) {
-    int sound = 0;
-    for (unsigned seed = 1; seed <= 6; ++seed) sound += Edit(seed, 60, way);
-    EXPECT_GT(sound, 60);
-  }
-}
+TEST_F(TranslateAgainTest, IsWhatAFreshBuildWouldBe) { EXPECT_GT(EditSeeds(Way::Living), 60); }
+
+TEST_F(TranslateAgainTest, RunAfterRunIsWhatAFreshBuildWouldBe) { EXPECT_GT(EditSeeds(Way::RunAfterRun), 60); }
 
 TEST_F(TranslateAgainTest, FromMemoryWithoutWriting) {
   for (const std::string& name : Names()) m_texts.Lay("tree/app/src/" + name, "");

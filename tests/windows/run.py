@@ -54,8 +54,11 @@ def text_of(done):
 
 def units(build):
     count = Count("unit tests")
+    known = [label for label in KNOWN if re.fullmatch(r"\w+Test\.\w+", label)]
+    for label in known:
+        count.skip(label, KNOWN[label])
     for program in sorted(build.glob("*_tests.exe")):
-        text = text_of(run([WINE, str(program)], cwd=build))
+        text = text_of(run([WINE, str(program), "--gtest_filter=-" + ":".join(known)], cwd=build))
         for label in re.findall(r"^\[       OK \] (\S+)", text, re.M):
             count.take(label, None)
         for label in dict.fromkeys(re.findall(r"^\[  FAILED  \] ([\w/]+\.[\w/]+)", text, re.M)):
