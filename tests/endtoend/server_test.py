@@ -273,7 +273,8 @@ def test_random_edits(client):
             status = Path(f"/proc/{client.process.pid}/status").read_text()
             sizes.append(int(status[status.index("VmRSS:") + 6:].split()[0]))
     assert compared > 10, compared
-    assert sizes[1] < sizes[0] + 10_000, sizes
+    keeps_what_is_freed = b"__asan_init" in Path(client.process.args[0]).read_bytes()
+    assert keeps_what_is_freed or sizes[1] < sizes[0] + 10_000, sizes
 
 
 run_tests(globals())
