@@ -1,5 +1,5 @@
 // What carries the messages of remote calls between two sides: an interface for transports, the queue within a process,
-// and the errors of calls. SocketChannel.h carries them between processes.
+// and the errors of calls. SocketChannel.h and those beside it carry them between processes.
 
 @import "Vesk/vxObject/Containers.h"
 
@@ -37,6 +37,30 @@ class MessageTooLong : public RemoteError {
   xvector<octet_t> m_head;
 };
 
+enum EPeerKind {
+  PK_UNKNOWN,
+  PK_THREAD,  // LocalChannel
+  PK_TCP,
+  PK_LOCAL,  // a Unix socket
+  PK_TLS,
+};
+
+// Who is on the other side of a channel, as far as that has been proved; what has not is empty, or -1.
+struct Peer {
+  EPeerKind m_kind = PK_UNKNOWN;
+  xstring m_address;     // of TCP and TLS, "127.0.0.1:4711"; it proves nothing
+  int64 m_user = -1;     // of a Unix socket: the number of the user
+  int64 m_process = -1;  // of a Unix socket: that which connected or listened; it may have ended since
+  xstring m_subject;     // of TLS: that of the certificate, "CN=ada,O=Example"
+  xstring m_token;       // the name of the token that was given
+};
+
+// As in "CN=ada at 127.0.0.1:4711".
+xstring PeerText(Peer const& peer);
+
+// Takes the same time wherever the two differ: it depends on the length of what was given alone.
+bool IsEqualInConstantTime(std::string_view given, std::string_view secret);
+
 // Carries whole messages, in order. Send and the Receives throw RemoteError where the transport fails.
 class Channel {
  public:
@@ -52,6 +76,7 @@ class Channel {
   virtual bool IsOpen() const { return true; }
   // False where the other side works in this thread only, and cannot while a call waits here.
   virtual bool CanAnswer() const { return true; }
+  virtual Peer GetPeer() const { return Peer(); }
 };
 
 // Two ends of a queue in each direction, for one thread.

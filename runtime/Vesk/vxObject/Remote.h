@@ -6,8 +6,10 @@
 // Neither side trusts the other. A message that cannot be read, names nothing that is exported, has bytes behind its
 // arguments or makes the method throw is answered with its error, and the server serves on; an answer is written to
 // the caller's parameters only while the call that asked for it is under way. What both ends share is a Channel:
-// LocalChannel in one process, SocketChannel.h between processes, or a class of one's own. A connection, a server and
-// what they call belong to one thread.
+// LocalChannel in one process, SocketChannel.h, LocalSocketChannel.h and TlsChannel.h between processes, or a class of
+// one's own. A connection, a server and what they call belong to one thread.
+//
+// A server may ask who calls: for a token ahead of all calls, and by a function for each. A token is a call of the object 0.
 
 @import "Vesk/vxObject/Channel.h"
 @import "Vesk/vxObject/Persist.h"
@@ -77,6 +79,8 @@ class ClientConnection {
   // Sends a call and waits for its answer, whose values `response` takes. Whatever way the call ends, no later answer
   // finds the response.
   void Call(Archive const& message, uint32 answer, PendingResponse& response);
+  // What Server::AddToken asks for. RemoteError when it is not a token of the server, which then ends the connection.
+  void GiveToken(xstring const& token);
 
  private:
   struct Pending;  // a call under way
@@ -158,6 +162,7 @@ class Dispatcher {
   void operator=(Dispatcher const&) = delete;
 
   virtual void SetDelegate(AnyInterface delegate) = 0;
+  ssize_t CountMethods() const { return m_count; }
   // RemoteError for one that is not there.
   void CheckMethod(ssize_t method) const;
   // The values that go back. A call may lead to another one of the same object.
@@ -257,8 +262,8 @@ void UnregisterScion(ConstStringZ name);
 template <typename Factory>
 Factory& FactoryOf(ConstStringZ name);
 
-// What became of a message. `NoCall`: it led to no method.
-enum class EServed { Nothing, Carried, NoCall, NotAnswered };
+// What became of a message. `NoCall`: it led to no method; `NoToken`: the other side has not given the token.
+enum class EServed { Nothing, Carried, NoCall, NoToken, NotAnswered };
 
 // The objects that the other side may call, by number. A number is not given out again.
 class Server {
@@ -281,6 +286,16 @@ class Server {
   // Takes an object back: later calls of it are errors. False for a number that is not exported.
   bool Unexport(uint32 number);
 
+  // Is asked ahead of each call, with the names of the interface and of the method (its number where the interface has
+  // no record) and with who calls. False refuses the call, and so does what it throws, whose text the caller gets.
+  typedef std::function<bool(ConstStringZ, ConstStringZ, Peer const&)> AuthorizeFunction;
+  void Authorize(AuthorizeFunction function) { m_authorize = std::move(function); }
+  // Until the other side has given one of the tokens, nothing is carried out. RemoteError for one of less than 16 bytes.
+  void AddToken(xstring token, xstring name = "token");
+  bool WaitsForToken() const { return !m_tokens.empty() && m_peer.m_token.empty(); }
+  // Who is on the other side; for the connect function of a server over sockets, and later.
+  Peer const& GetPeer() const;
+
   void SetMessageLimit(std::size_t bytes) { m_messageLimit = bytes; }
   // Is told each error, also those that go back to a caller. What it throws is dropped.
   void OnError(ErrorFunction function);
@@ -299,14 +314,16 @@ class Server {
 
   uint32 ExportSkeleton(ConstStringZ name, AnyInterface object);
   uint32 ExportScion(ConstStringZ name, AnyInterface object);
-  uint32 Add(Exported const& exported, AnyInterface object);
+  uint32 Add(Exported exported, ConstStringZ name, AnyInterface object);
 
   struct Call {
     uint32 m_answer = 0;
-    bool m_isCall = false;  // there is such an object and method
+    EServed m_served = EServed::NoCall;
   };
   EServed Dispatch(xvector<octet_t> message);
   Archive Carry(xvector<octet_t> message, Call& call);
+  void CheckToken(uint32 object, uint32 method, InputArchive& ar);
+  void CheckAuthorized(Exported const& exported, uint32 method) const;
   void SendValues(uint32 answer, Archive const& results);
   void SendError(uint32 answer, std::string_view text);
   EServed AnswerError(Call const& call, ConstStringZ text);
@@ -315,6 +332,9 @@ class Server {
   Channel& m_channel;
   std::size_t m_messageLimit = kMessageLimit;
   ErrorFunction m_onError;
+  AuthorizeFunction m_authorize;
+  xvector<std::pair<xstring, xstring>> m_tokens;  // with their names
+  mutable Peer m_peer;                            // asked of the channel when it is first needed
   uint32 m_lastNumber = 0;
   Objects* m_objects;
 };

@@ -8,6 +8,7 @@
 @import "Vesk/vxObject/src/parts/registry.h"
 @import "Vesk/vxObject/src/parts/releases.h"
 @import "Vesk/vxObject/src/parts/objects.h"
+@import "Vesk/vxObject/src/parts/frames.h"
 @import "Vesk/vxObject/src/parts/remote.h"
 
 vxDefineTarget(Vesk_vxObject, 1)

@@ -22,6 +22,11 @@ struct LocalChannel::Ends {
       m_in.pop_front();
       return true;
     }
+    Peer GetPeer() const override {
+      Peer peer;
+      peer.m_kind = PK_THREAD;
+      return peer;
+    }
     Queue& m_out;
     Queue& m_in;
   };
@@ -39,6 +44,23 @@ std::chrono::steady_clock::time_point EndOf(std::chrono::milliseconds time) {
   return std::chrono::steady_clock::now() + std::clamp<Time>(time, Time(0), std::chrono::hours(24 * 365 * 100));
 }
 
+xstring PeerText(Peer const& peer) {
+  static constexpr ConstStringZ kKinds[] = {"someone", "this thread", "a client over TCP", "a local process", "a client over TLS"};
+  const std::string token = peer.m_token.empty() ? "" : " with the token " + peer.m_token;
+  std::string who = kKinds[peer.m_kind];
+  if (peer.m_user >= 0) who = "user " + std::to_string(peer.m_user);
+  if (!peer.m_subject.empty()) who = peer.m_subject;
+  return who + (peer.m_address.empty() ? "" : " at " + peer.m_address) + token;
+}
+
+bool IsEqualInConstantTime(std::string_view given, std::string_view secret) {
+  unsigned difference = given.size() != secret.size() || secret.empty();
+  for (std::size_t i = 0, at = 0; i < given.size() && !secret.empty(); ++i, at = at + 1 == secret.size() ? 0 : at + 1) {
+    difference |= static_cast<unsigned>(static_cast<octet_t>(given[i] ^ secret[at]));
+  }
+  return difference == 0;
+}
+
 xstring TooLongText(std::size_t size, std::size_t limit) {
   return vxMakeString("message of " << size << " bytes, the limit is " << limit);
 }
@@ -51,6 +73,9 @@ MessageTooLong::MessageTooLong(std::size_t size, std::size_t limit, xvector<octe
     : RemoteError(TooLongText(size, limit)), m_head(std::move(head)) {}
 
 // --- Client
+
+// The number by which a token is given; that of no object.
+constexpr uint32 kTokenObject = 0;
 
 // A call within another one stands behind it in the list.
 struct ClientConnection::Pending {
@@ -106,6 +131,18 @@ bool ClientConnection::DispatchWithin(std::chrono::milliseconds time) {
   const std::size_t size = message.size();
   Dispatch(std::move(message), size > m_messageLimit ? TooLongText(size, m_messageLimit) : xstring());
   return true;
+}
+
+void ClientConnection::GiveToken(xstring const& token) {
+  Archive message;
+  const uint32 answer = NextAnswer();
+  for (uint32 number : {kTokenObject, uint32(0), answer}) SerialiseVariableLengthUint(message, number);
+  message << token;
+  struct : PendingResponse {
+    void** OutParams() override { return nullptr; }
+  } response;
+  response.m_fn = ReadResults([](InputArchive&, void**) {});
+  Call(message, answer, response);
 }
 
 // An answer that nobody waits for any more is dropped. `error`: why its values cannot be read.
@@ -242,6 +279,8 @@ template IScionFactory& FactoryOf<IScionFactory>(ConstStringZ);
 struct Server::Exported {
   std::shared_ptr<Dispatcher> m_dispatcher;  // an object may be taken back by its own method
   void* m_self = nullptr;                    // as its thunks see it
+  ConstStringZ m_interface = nullptr;
+  ReflectedInterface const* m_record = nullptr;  // null where that is not registered
 };
 struct Server::Objects : std::map<uint32, Exported> {};
 
@@ -251,19 +290,60 @@ Server::~Server() { delete m_objects; }
 uint32 Server::ExportSkeleton(ConstStringZ name, AnyInterface object) {
   if (!name) throw RemoteError("null cannot be exported");
   Skeleton* skeleton = FactoryOf<ISkeletonFactory>(name).CreateSkeleton();
-  return Add({std::shared_ptr<Dispatcher>(skeleton), skeleton}, object);
+  return Add({std::shared_ptr<Dispatcher>(skeleton), skeleton}, name, object);
 }
 uint32 Server::ExportScion(ConstStringZ name, AnyInterface object) {
   if (!name) throw RemoteError("null cannot be exported");
   Scion* scion = FactoryOf<IScionFactory>(name).CreateScion();
-  return Add({std::shared_ptr<Dispatcher>(scion), scion}, object);
+  return Add({std::shared_ptr<Dispatcher>(scion), scion}, name, object);
 }
-uint32 Server::Add(Exported const& exported, AnyInterface object) {
+uint32 Server::Add(Exported exported, ConstStringZ name, AnyInterface object) {
   exported.m_dispatcher->SetDelegate(object);
-  (*m_objects)[++m_lastNumber] = exported;
+  exported.m_interface = name;
+  ReflectedInterface const* const record = Find<ReflectedInterface>(name);
+  if (record && record->m_numMethods == exported.m_dispatcher->CountMethods()) exported.m_record = record;
+  (*m_objects)[++m_lastNumber] = std::move(exported);
   return m_lastNumber;
 }
 bool Server::Unexport(uint32 number) { return m_objects->erase(number) > 0; }
+
+void Server::AddToken(xstring token, xstring name) {
+  if (token.size() < 16) throw RemoteError("a token has at least 16 bytes");
+  if (name.empty()) throw RemoteError("a token needs a name");
+  m_tokens.emplace_back(std::move(token), std::move(name));
+}
+
+Peer const& Server::GetPeer() const {
+  if (m_peer.m_kind == PK_UNKNOWN) {
+    Peer peer = m_channel.GetPeer();
+    peer.m_token = m_peer.m_token;
+    m_peer = std::move(peer);
+  }
+  return m_peer;
+}
+
+// All tokens are compared, whichever it is.
+void Server::CheckToken(uint32 object, uint32 method, InputArchive& ar) {
+  if (object != kTokenObject || method != 0) throw RemoteError("the server asks for a token first");
+  xstring given;
+  ar >> given;
+  if (ar.Remaining() > 0) throw RemoteError("bytes behind the token");
+  if (m_tokens.empty()) throw RemoteError("the server asks for no token");
+  xstring found;
+  for (auto const& [token, name] : m_tokens) {
+    if (IsEqualInConstantTime(given, token)) found = name;
+  }
+  if (found.empty()) throw RemoteError("not a token of the server");
+  m_peer.m_token = found;
+}
+
+void Server::CheckAuthorized(Exported const& exported, uint32 method) const {
+  if (!m_authorize) return;
+  const std::string name = exported.m_record ? exported.m_record->m_methods[method].m_name : std::to_string(method);
+  Peer const& peer = GetPeer();
+  if (m_authorize(exported.m_interface, name.c_str(), peer)) return;
+  throw RemoteError(PeerText(peer) + " may not call " + exported.m_interface + "." + name);
+}
 
 void Server::OnError(ErrorFunction function) { m_onError = std::move(function); }
 
@@ -320,11 +400,18 @@ Archive Server::Carry(xvector<octet_t> message, Call& call) {
   DeserialiseVariableLengthUint(ar, answer);
   call.m_answer = answer;
   CheckMessageSize(size, m_messageLimit);
+  if (WaitsForToken() || object == kTokenObject) {
+    call.m_served = EServed::NoToken;
+    CheckToken(object, method, ar);
+    call.m_served = EServed::Carried;
+    return Archive();
+  }
   const auto at = m_objects->find(object);
   if (at == m_objects->end()) throw RemoteError("no such remote object");
   const Exported exported = at->second;
   exported.m_dispatcher->CheckMethod(method);
-  call.m_isCall = true;
+  CheckAuthorized(exported, method);
+  call.m_served = EServed::Carried;
   return exported.m_dispatcher->Call(exported.m_self, method, std::move(ar));
 }
 
@@ -352,12 +439,11 @@ void Server::SendError(uint32 answer, std::string_view text) {
 // Throws nothing. Where the text cannot be sent (the channel's limit may be a smaller one), that there was an error is.
 EServed Server::AnswerError(Call const& call, ConstStringZ text) {
   Report(text);
-  const EServed served = call.m_isCall ? EServed::Carried : EServed::NoCall;
-  if (!call.m_answer) return served;
+  if (!call.m_answer) return call.m_served;
   for (std::string_view part : {std::string_view(text), std::string_view()}) {
     try {
       SendError(call.m_answer, part);
-      return served;
+      return call.m_served;
     } catch (std::exception const& error) {
       Report(error.what());
     }
