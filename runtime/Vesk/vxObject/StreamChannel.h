@@ -10,13 +10,16 @@
 @import "Vesk/vxObject/Remote.h"
 
 #include <boost/asio.hpp>
+#ifndef _WIN32
+#include <poll.h>
+#endif
 
 namespace vesk {
 
 // What is at the end of a channel's stream. A transport has
 //   Protocol, Stream, Context        of Asio; what its streams are made from
 //   kHandshakes                      whether they begin with async_handshake
-//   kWritesAtOnce                    whether write_some without waiting leaves the stream as it should be
+//   kIsSocket                        whether the stream is a socket, that can be read and written without waiting
 //   Stream Make(socket, context)
 //   void SetUp(Stream&)
 //   Peer PeerOf(Stream&)
@@ -26,7 +29,7 @@ namespace vesk {
 struct PlainTransport {
   struct Context {};
   static constexpr bool kHandshakes = false;
-  static constexpr bool kWritesAtOnce = true;
+  static constexpr bool kIsSocket = true;
   template <typename Stream>
   static Stream Make(Stream socket, Context&) {
     return socket;
@@ -51,7 +54,7 @@ class StreamEnd : public std::enable_shared_from_this<StreamEnd<Transport>> {
   typedef typename Transport::Stream Stream;
   StreamEnd(Stream stream, bool waits) : m_stream(std::move(stream)), m_waits(waits), m_frames(waits) {
     boost::system::error_code ignored;
-    if (Transport::kWritesAtOnce) Socket().non_blocking(true, ignored);
+    if (Transport::kIsSocket) Socket().non_blocking(true, ignored);
     Transport::SetUp(m_stream);
   }
 
@@ -116,6 +119,22 @@ class StreamEnd : public std::enable_shared_from_this<StreamEnd<Transport>> {
             self.EndRead(error, size);
           });
   }
+#ifndef _WIN32
+  // Whether the other side can be waited for by ReadUntil, which asks the system for nothing else, and so for less.
+  bool CanReadAlone() const { return Transport::kIsSocket && m_waits && !m_isReading && CanRead() && !IsSending(); }
+  // False when the time is over.
+  bool ReadUntil(std::chrono::steady_clock::time_point end) {
+    pollfd waiting = {Socket().native_handle(), POLLIN, 0};
+    const auto left = std::chrono::ceil<std::chrono::milliseconds>(end - std::chrono::steady_clock::now());
+    if (poll(&waiting, 1, static_cast<int>(std::clamp<long long>(left.count(), 0, 1000))) <= 0) {
+      return std::chrono::steady_clock::now() < end;
+    }
+    boost::system::error_code error;
+    const std::size_t size = m_stream.read_some(boost::asio::buffer(m_buffer), error);
+    if (error != boost::asio::error::would_block) EndRead(error, size);
+    return true;
+  }
+#endif
   // ChannelClosed where the other side does not read what it is sent.
   void Queue(xvector<octet_t> const& message) {
     const std::size_t size = m_out.size() + MessageFrames::LengthBytes + message.size();
@@ -168,12 +187,12 @@ class StreamEnd : public std::enable_shared_from_this<StreamEnd<Transport>> {
     } else if (!m_frames.Append(m_buffer, size)) {
       Close();
     } else if (!HasMessage() || size == sizeof(m_buffer)) {
-      StartRead();
+      if (!m_waits) StartRead();
     }
   }
   void StartWrite() {
     if (m_writing.empty()) m_writing.swap(m_out);
-    if (Transport::kWritesAtOnce && !WriteAtOnce()) return;
+    if (Transport::kIsSocket && !WriteAtOnce()) return;
     Begin([this](auto handler) { m_stream.async_write_some(ToWrite(), std::move(handler)); },
           [](StreamEnd& self, boost::system::error_code const& error, std::size_t size) {
             if (error) return self.Fail(error);
@@ -283,6 +302,7 @@ class StreamChannel : public Channel {
 
   // --- Of who serves many
   bool CanServe() const { return m_end->HasMessage() && m_end->Unsent() < StreamEnd<Transport>::kMostUnread; }
+  bool HasMessage() const { return m_end->HasMessage(); }
   // The other side sends no more.
   bool HasEnded() const { return m_end->HasEnded(); }
   // Whether the other side has proved by now who it is; why it could not.
@@ -301,6 +321,9 @@ class StreamChannel : public Channel {
  protected:
   // False when the time is over.
   bool RunOneUntil(Clock::time_point end) {
+#ifndef _WIN32
+    if (m_end->CanReadAlone()) return m_end->ReadUntil(end);
+#endif
     m_end->StartRead();
     m_io->restart();
     return m_io->run_one_until(end) > 0;
