@@ -3,8 +3,8 @@
 
 import re
 
-from runtime_fixture import PLAIN, has_asio, link, run_tour, translate
-from workspace_fixture import Skipped, equal, holds, need, run_tests
+from runtime_fixture import PLAIN, has_header, link, run_tour, translate
+from workspace_fixture import ROOT, Skipped, equal, holds, need, run_tests
 
 # The tour and the scenarios without memory.
 ADDRESSES = "g++ -std=c++17 -g1 -fsanitize=address,undefined -fno-sanitize=bool -Wall -Werror -Wno-deprecated-declarations"
@@ -79,12 +79,13 @@ def test_byte_order(binary):
                         "[1,0,3,1,99]", "numbers[300]", "nested[k][300]"])
 
 
-def run_under(binary, name, output, *compilers):
+def run_under(binary, name, output, *compilers, sources=None, libraries="-lpthread", prepare=lambda workspace: None):
     need("g++", "setarch")
     workspace, root = translate(binary, f"{name}.qrws")
     with workspace:
+        prepare(workspace)
         for compiler in compilers:
-            link(workspace, compiler, [f"{root}/{name}/src/{name}.cpp"], name, "-lpthread")
+            link(workspace, compiler, [f"{root}/{name}/src/{source}.cpp" for source in sources or [name]], name, libraries)
             # Some kernels place the program where the sanitizer wants its own memory. AddressSanitizer warns of each use of
             # another stack.
             printed = workspace.shell(f"setarch -R ./{name} 2>errors || {{ cat errors; false; }}")
@@ -97,13 +98,31 @@ def test_threads(binary):
     run_under(binary, "threads", "a line\n" * 80 + "flush left\n0 0 0 0 0\n", THREADS, ADDRESSES)
 
 
+def make_certificates(workspace):
+    """Those of the page, and such as are not taken."""
+    page = (ROOT / "docs/runtime.md").read_text()
+    commands = re.findall(r"(?m)^    (openssl req .*|openssl x509 .*)$", page)
+    equal(len(commands), 5)
+    sign = "openssl x509 -req -copy_extensions copy -CA authority.pem -CAkey authority.key"
+    named = "openssl req -new -key server.key -subj /CN=localhost -addext subjectAltName=DNS:"
+    workspace.shell(" && ".join([
+        *commands, "cp server.key other.key", "cp server.key late.key", "cp server.key foreign.key",
+        f"{named}elsewhere -out other.csr", f"{sign} -in other.csr -out other.pem -days 365",
+        f"{named}localhost -out late.csr", f"{sign} -in late.csr -out late.pem -days -1",
+        f"{named}localhost -x509 -out foreign.pem"]))
+
+
 def test_sockets(binary):
-    """A server in one thread, stopped by another, and its clients in threads of their own; clients that leave or flood,
-    no descriptors, methods that serve or call while they are called."""
-    need("g++")
-    if not has_asio():
+    """Each transport: a server in one thread, stopped by another, and its clients in threads of their own; clients that
+    leave, stall, flood or lie, no descriptors, methods that serve or call while they are called; who may enter and call."""
+    need("g++", "openssl")
+    if not has_header("boost/asio.hpp"):
         raise Skipped("boost/asio.hpp")
-    run_under(binary, "sockets", "100\n", THREADS)
+    with_tls = has_header("openssl/ssl.h")
+    run_under(binary, "sockets", f"{4 + with_tls}\n", THREADS, ADDRESSES, sources=["sockets"] + ["tls"] * with_tls,
+              libraries="-lpthread" + " -lssl -lcrypto" * with_tls, prepare=make_certificates)
+    if not with_tls:
+        raise Skipped("openssl/ssl.h")
 
 
 def test_memory(binary):

@@ -79,6 +79,5 @@ def run_tour(binary, compiler):
         equal(workspace.shell("./tour 2>&1"), (TOUR / "expected.txt").read_text())
 
 
-def has_asio():
-    command = ["g++", "-E", "-x", "c++", "-include", "boost/asio.hpp", "/dev/null"]
-    return subprocess.run(command, capture_output=True).returncode == 0
+def has_header(name):
+    return subprocess.run(["g++", "-E", "-x", "c++", "-include", name, "/dev/null"], capture_output=True).returncode == 0

@@ -59,6 +59,7 @@ class StreamServer {
  protected:
   StreamServer(ConnectFunction connect, typename Transport::Context context = {})
       : m_io(std::make_shared<boost::asio::io_context>()),
+        m_work(m_io->get_executor()),
         m_acceptor(*m_io),
         m_connect(std::move(connect)),
         m_context(std::move(context)) {}
@@ -259,6 +260,8 @@ class StreamServer {
   }
 
   std::shared_ptr<boost::asio::io_context> m_io;
+  // So that events are waited for where there are no clients and none can be accepted.
+  boost::asio::executor_work_guard<boost::asio::io_context::executor_type> m_work;
   typename Protocol::acceptor m_acceptor;
   ConnectFunction m_connect;
   typename Transport::Context m_context;

@@ -14,6 +14,7 @@
 @import "Vesk/vxObject/SocketChannel.h"
 
 #include <boost/asio/ssl.hpp>
+#include <fstream>
 
 namespace vesk {
 
@@ -50,11 +51,12 @@ struct TlsTransport : TcpAddresses {
 };
 
 inline TlsTransport::Context TlsTransport::MakeContext(TlsFiles const& files, bool isServer) {
-  namespace ssl = boost::asio::ssl;
-  const auto context = std::make_shared<ssl::context>(isServer ? ssl::context::tls_server : ssl::context::tls_client);
+  typedef boost::asio::ssl::context Tls;
+  const auto context = std::make_shared<Tls>(isServer ? Tls::tls_server : Tls::tls_client);
   boost::system::error_code error;
   auto load = [&](std::string const& file, ConstStringZ what, auto function) {
     if (file.empty()) return;
+    if (!std::ifstream(file)) throw RemoteError(std::string("cannot open the ") + what + " " + file);
     function(file);
     if (error) throw RemoteError(std::string("cannot use the ") + what + " " + file + ": " + error.message());
   };
@@ -62,7 +64,7 @@ inline TlsTransport::Context TlsTransport::MakeContext(TlsFiles const& files, bo
     throw RemoteError(isServer ? "a TLS server needs a certificate" : "a TLS client needs the server's authority");
   }
   load(files.m_certificate, "certificate", [&](auto& file) { context->use_certificate_chain_file(file, error); });
-  load(files.m_key, "key", [&](auto& file) { context->use_private_key_file(file, ssl::context::pem, error); });
+  load(files.m_key, "key", [&](auto& file) { context->use_private_key_file(file, Tls::pem, error); });
   load(files.m_authority, "authority", [&](auto& file) { context->load_verify_file(file, error); });
   SSL_CTX* const native = context->native_handle();
   if (!files.m_certificate.empty() && SSL_CTX_check_private_key(native) != 1) {
@@ -72,7 +74,7 @@ inline TlsTransport::Context TlsTransport::MakeContext(TlsFiles const& files, bo
   SSL_CTX_set_session_cache_mode(native, SSL_SESS_CACHE_OFF);
   SSL_CTX_set_num_tickets(native, 0);
   const bool asks = !files.m_authority.empty();
-  context->set_verify_mode(asks ? ssl::verify_peer | ssl::verify_fail_if_no_peer_cert : ssl::verify_none);
+  context->set_verify_mode(asks ? SSL_VERIFY_PEER | SSL_VERIFY_FAIL_IF_NO_PEER_CERT : SSL_VERIFY_NONE);
   return context;
 }
 

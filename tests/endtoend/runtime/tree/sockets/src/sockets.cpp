@@ -1,45 +1,13 @@
-// A server over TCP in one thread and clients in others, each with a connection of its own; the server is stopped from
-// outside. Then clients that leave, flood and lie, and what methods do to their own server. Prints what went wrong, and
-// the sum of all calls.
-@import "Vesk/vxObject/IObject.h"
-@import "Vesk/vxObject/SocketChannel.h"
+// All transports, and what is of one of them. Prints what went wrong, and the number of transports.
+@import "sockets/sockets.h"
+@import "Vesk/vxObject/LocalSocketChannel.h"
 
 #include <malloc.h>
-#include <sys/resource.h>
-#include <ctime>
-#include <thread>
+#include <sys/wait.h>
 
 vxDefineTarget(sockets, 1)
 void Register_Project_sockets();
 
-$interface+ rmi ISum : vesk::IObject {
-    void Add([in] int32 n, [in] const string8& text, [out] int32& length);
-    void Tell([in] int32 n);
-    void Say([in] int32 size, [out] string8& text);
-    void Nest([out] int32& n);
-};
-$class+ Sum isa ISum {
-public:
-    void Add(int32 n, const vesk::string8& text, int32& length) {
-        if (n < 0) throw std::invalid_argument("negative");
-        sum += n;
-        length = int32(text.size());
-    }
-    void Tell(int32 n) {
-        told += n;
-        std::this_thread::sleep_for(std::chrono::microseconds(50));
-    }
-    void Say(int32 size, vesk::string8& text) { text.assign(size, 'x'); }
-    void Nest(int32& n) {
-        if (nest) nest();
-        n = 1;
-    }
-    int32 sum = 0;
-    int32 told = 0;
-    std::function<void()> nest;
-};
-
-// What the program holds, and which of this thread's allocations fails.
 std::atomic<std::size_t> g_held;
 thread_local int t_untilFailure = 0;
 
@@ -55,255 +23,199 @@ void operator delete(void* memory) noexcept {
 }
 void operator delete(void* memory, std::size_t) noexcept { operator delete(memory); }
 
-typedef std::chrono::steady_clock Clock;
-typedef std::chrono::milliseconds Time;
-typedef boost::asio::ip::tcp Tcp;
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-void Check(bool is, const char* what) {
-    if (!is) vesk::xout() << "not so: " << what << '\n';
-}
-#define CHECK(is) Check(is, #is)
-
-vesk::xstring ErrorOf(std::function<void()> const& action) {
-    try {
-        action();
-    } catch (vesk::RemoteError const& error) {
-        return error.what();
+struct PlainStream {
+    static constexpr std::size_t Greeting = 0;
+    template <typename Stream, typename Handler>
+    static void Begin(Stream&, Handler handler) {
+        handler(boost::system::error_code());
     }
-    return "none";
-}
-
-const int kClients = 4;
-const int kCalls = 25;
-
-struct Client {
-    explicit Client(vesk::uint16 port)
-        : channel(vesk::SocketChannel::Connect("127.0.0.1", port)), connection(*channel),
-          stub(vesk::Import<ISum>(connection, 1)), sum(stub->Interface()) {
-        connection.SetTimeout(Time::max());
-        channel->SetTimeout(Time::max());
+    template <typename Stream>
+    static void End(Stream& stream) {
+        boost::system::error_code ignored;
+        stream.shutdown(boost::asio::socket_base::shutdown_send, ignored);
     }
-    std::unique_ptr<vesk::SocketChannel> channel;
-    vesk::ClientConnection connection;
-    std::unique_ptr<vesk::Stub> stub;
-    vesk::ptr<ISum> sum;
 };
 
-// How many calls gave what they must.
-int Call(vesk::uint16 port) {
-    int right = 0;
-    Client client(port);
-    int32 length = 0;
-    for (int i = 0; i < kCalls; ++i) {
-        client.sum->Add(1, vesk::string8(i * 1000, 'x'), length);
-        right += length == i * 1000;
+struct OverTcp : PlainStream {
+    static constexpr const char* Name = "TCP";
+    typedef vesk::SocketServer Server;
+    typedef vesk::SocketChannel Channel;
+    typedef Tcp::socket Stream;
+    static auto Listen(Server::ConnectFunction connect) { return std::make_unique<Server>(0, std::move(connect)); }
+    static auto Connect(Server& server) { return Channel::Connect("127.0.0.1", server.Port()); }
+    static Stream Reach(boost::asio::io_context& io, Server& server) {
+        Stream stream(io);
+        stream.connect(Tcp::endpoint(boost::asio::ip::address_v4::loopback(), server.Port()));
+        return stream;
     }
-    right += ErrorOf([&] { client.sum->Add(-1, "", length); }) == "negative";
+    static void CheckPeer(vesk::Peer const& peer) {
+        CHECK(peer.m_kind == vesk::PK_TCP && peer.m_address.compare(0, 10, "127.0.0.1:") == 0 && peer.m_user == -1);
+    }
+};
 
-    // Answers that are too long for this client alone.
-    client.channel->SetMessageLimit(5000);
-    vesk::string8 text;
-    for (int size : {5000, 1000000, 100}) {
-        const vesk::xstring error = ErrorOf([&] { client.sum->Say(size, text); });
-        const int bytes = size + (size > 5000 ? 5 : 4);  // with the number, the kind and the text's length
-        right += error == (size == 100 ? vesk::xstring("none") : vesk::TooLongText(bytes, 5000));
+struct OverLocalSocket : PlainStream {
+    static constexpr const char* Name = "Unix sockets";
+    typedef vesk::LocalSocketServer Server;
+    typedef vesk::LocalSocketChannel Channel;
+    typedef vesk::LocalSocketTransport::Stream Stream;
+    static auto Listen(Server::ConnectFunction connect) { return std::make_unique<Server>("a.socket", std::move(connect)); }
+    static auto Connect(Server& server) { return Channel::Connect(server.Path()); }
+    static Stream Reach(boost::asio::io_context& io, Server& server) {
+        Stream stream(io);
+        stream.connect(server.Path());
+        return stream;
     }
-    return right;
-}
+    static void CheckPeer(vesk::Peer const& peer) {
+        CHECK(peer.m_kind == vesk::PK_LOCAL && peer.m_user == getuid() && peer.m_process == getpid());
+    }
+};
 
-// A server without a thread, which serves until `isDone` or for so long.
-struct Host {
-    Host() : server(0, [this](vesk::Server& client) { client.Export(vesk::ptr<ISum>(&sum)); }) {
-        server.OnError([this](std::string const& text) { ++errors, lastError = text; });
+// The same talk within this thread.
+struct ThreadTalk {
+    static constexpr bool IsOneThread = true;
+    explicit ThreadTalk(std::function<void(vesk::Server&)> prepare) : server(ends.Server()) {
+        server.Export(vesk::ptr<ISum>(&sum));
+        prepare(server);
     }
-    Time Serve(Time time, std::function<bool()> const& isDone = nullptr) {
-        const auto begin = Clock::now();
-        server.ServeUntil([&] { return Clock::now() - begin > time || (isDone && isDone()); });
-        return std::chrono::duration_cast<Time>(Clock::now() - begin);
+    vesk::Channel* Connect() { return &ends.Client(); }
+    void End() { server.Serve(); }
+    static void CheckPeer(vesk::Peer const& peer) { CHECK(peer.m_kind == vesk::PK_THREAD); }
+    operator std::function<void()>() {
+        return [this] { server.Serve(); };
     }
+    vesk::LocalChannel ends;
+    vesk::Server server;
     Sum sum;
-    vesk::SocketServer server;
-    int errors = 0;
-    std::string lastError;
 };
 
-// A client that sends what it likes.
-struct Raw {
-    explicit Raw(Host& host) : socket(io) {
-        socket.connect(Tcp::endpoint(boost::asio::ip::address_v4::loopback(), host.server.Port()));
-    }
-    void Send(Bytes const& message, int times = 1) {
-        Bytes bytes;
-        for (int i = 0; i < times; ++i) {
-            bytes.insert(bytes.end(), {vesk::octet_t(message.size()), 0, 0, 0});
-            bytes.insert(bytes.end(), message.begin(), message.end());
-        }
-        boost::system::error_code error;
-        boost::asio::write(socket, boost::asio::buffer(bytes.data(), bytes.size()), error);
-    }
-    void End() { socket.shutdown(Tcp::socket::shutdown_send); }
-    // All that comes until the server closes.
-    Bytes Rest() {
-        Bytes bytes(1000);
-        boost::system::error_code error;
-        bytes.resize(boost::asio::read(socket, boost::asio::buffer(bytes.data(), bytes.size()), error));
-        return bytes;
-    }
-    boost::asio::io_context io;
-    Tcp::socket socket;
-};
+// --- The file of a Unix socket
 
-// Calls of the first object: a stub's bytes.
-const Bytes kTell = {1, 1, 0, 1, 0, 0, 0};
-const Bytes kSay = {1, 2, 9, 2, 0, 0, 0};
-const Bytes kNest = {1, 3, 9};
-
-// Who ends its sending gets its answers; who leaves is served, but for what leads to nothing.
-void CheckLeaving() {
-    Host host;
-    {
-        Raw raw(host);
-        raw.Send(kSay, 2);
-        raw.End();
-        host.Serve(Time(5000), [&] { return host.server.Clients() == 1; });
-        host.Serve(Time(5000), [&] { return host.server.Clients() == 0; });
-        CHECK(raw.Rest() == (Bytes{5, 0, 0, 0, 9, 0, 2, 'x', 'x', 5, 0, 0, 0, 9, 0, 2, 'x', 'x'}));
-    }
-    {
-        Raw raw(host);
-        raw.Send(kTell, 300);
-    }
-    host.Serve(Time(5000), [&] { return host.sum.told == 300; });
-    {
-        Raw raw(host);
-        raw.Send({}, 100000);
-    }
-    host.Serve(Time(20000), [&] { return host.errors > 0 && host.server.Clients() == 0; });
-    CHECK(host.sum.told == 300 && host.errors > 0 && host.errors < 1000 && host.server.Clients() == 0);
+vesk::LocalSocketServer::ConnectFunction NoObjects() {
+    return [](vesk::Server&) {};
+}
+int ModeOf(const char* path) {
+    struct stat there;
+    return lstat(path, &there) == 0 ? there.st_mode & 0777 : -1;
 }
 
-// The end is kept, others are served and memory is bounded while one client sends more than can be carried out.
-void CheckFlood() {
-    Host host;
-    host.server.SetMessageLimit(100000);
-    Raw flood(host);
-    const std::size_t before = g_held;
-    std::size_t most = 0;
-    std::thread sending([&flood] {
-        for (int i = 0; i < 1000; ++i) flood.Send(kTell, 1000);  // 11 MB
+// Whoever looks at it sees one mode, whatever the mask is; at the end nothing is left.
+void CheckMode() {
+    const mode_t mask = umask(0);
+    std::atomic<bool> isDone = false;
+    int seen = 0, others = 0;
+    std::thread looking([&] {
+        while (!isDone) {
+            const int mode = ModeOf("mode.socket");
+            seen += mode == 0600;
+            others += mode != 0600 && mode != -1;
+        }
     });
-    Raw other(host);
-    other.Send(kSay);
-    host.Serve(Time(5000), [&] { return host.sum.told > 0 && other.socket.available() > 0; });
-    CHECK(host.sum.told < 1000);
-    auto measure = [&] {
-        most = std::max<std::size_t>(most, g_held);
-        return false;
-    };
-    host.Serve(Time(20000), [&] { return measure() || most - before > 100000; });  // until the flood is there
-    CHECK(host.Serve(Time(600), measure) < Time(2000));
-    CHECK(most - before > 100000 && most - before < 400000);
-    CHECK(host.server.Clients() == 2);
-    flood.socket.shutdown(Tcp::socket::shutdown_both);
-    sending.join();
+    for (int i = 0; i < 500; ++i) vesk::LocalSocketServer("mode.socket", NoObjects());
+    isDone = true;
+    looking.join();
+    umask(mask);
+    CHECK(seen > 0 && others == 0);
+    CHECK(ModeOf("mode.socket") == -1 && ModeOf("mode.socket.lock") == -1);
 }
 
-// At the limit of descriptors the clients that are there are served, those that wait later, and nothing spins.
-void CheckDescriptors() {
-    Host host;
-    Raw first(host);
-    host.Serve(Time(5000), [&] { return host.server.Clients() == 1; });
-    Raw second(host), third(host);
-    rlimit limit;
-    getrlimit(RLIMIT_NOFILE, &limit);
-    const rlimit none = {0, limit.rlim_max};
-    setrlimit(RLIMIT_NOFILE, &none);
-    const std::clock_t before = std::clock();
-    first.Send(kSay);
-    CHECK(host.Serve(Time(500)) < Time(1500));
-    CHECK(std::clock() - before < CLOCKS_PER_SEC / 4);
-    CHECK(first.socket.available() == 9 && host.server.Clients() == 1);
-    setrlimit(RLIMIT_NOFILE, &limit);
-    host.Serve(Time(5000), [&] { return host.server.Clients() == 3; });
-    CHECK(host.server.Clients() == 3);
-}
-
-// Where memory runs out, at whatever place, a client may be lost; the server serves the next one.
-void CheckMemory() {
-    Host host;
-    bool hasFailed = true;
-    int runs = 0;
-    for (; hasFailed; ++runs) {
-        {
-            Raw raw(host);
-            raw.Send(kSay);
-            bool isServing = false, isServed = false;
-            host.Serve(Time(50), [&] {
-                if (!std::exchange(isServing, true)) t_untilFailure = runs + 1;
-                return isServed = raw.socket.available() > 0;
-            });
-            hasFailed = t_untilFailure <= 0;
-            t_untilFailure = 0;
-            CHECK(hasFailed || isServed);
+// A process that listens and is killed, or is told to go on.
+struct OtherProcess {
+    explicit OtherProcess(bool lives) {
+        int ready[2];
+        CHECK(pipe(ready) == 0);
+        child = fork();
+        if (child == 0) {
+            vesk::LocalSocketServer server("taken.socket", NoObjects());
+            CHECK(write(ready[1], "", 1) == 1);
+            for (;;) pause();
         }
-        Raw next(host);
-        next.Send(kSay);
-        host.Serve(Time(5000), [&] { return next.socket.available() > 0; });
-        CHECK(next.socket.available() == 9);
+        char byte;
+        CHECK(read(ready[0], &byte, 1) == 1);
+        close(ready[0]), close(ready[1]);
+        if (!lives) End();
     }
-    CHECK(runs > 5);
-    host.Serve(Time(5000), [&] { return host.server.Clients() == 0; });
-    CHECK(host.server.Clients() == 0);
+    ~OtherProcess() { End(); }
+    void End() {
+        if (child <= 0) return;
+        kill(child, SIGKILL);
+        waitpid(std::exchange(child, 0), nullptr, 0);
+    }
+    pid_t child;
+};
+
+std::string ErrorOfListening(const char* path) {
+    return ErrorOf([path] { vesk::LocalSocketServer(path, NoObjects()); });
 }
 
-// Methods that serve while they are called by a client that leaves, and that call their own server.
-void CheckNesting() {
-    Host host;
+void CheckTakingOver() {
     {
-        Raw raw(host);
-        raw.Send(kNest);
+        const OtherProcess living(true);
+        CheckText(ErrorOfListening("taken.socket"), "another server listens on taken.socket");
+        unlink("taken.socket.lock");  // one without a lock is asked
+        CheckText(ErrorOfListening("taken.socket"), "another server listens on taken.socket");
     }
-    host.sum.nest = [&] { host.Serve(Time(200)); };
-    host.Serve(Time(500));
-    CHECK(host.server.Clients() == 0);
+    CHECK(ModeOf("taken.socket") == 0600);
+    CheckText(ErrorOf([] { vesk::LocalSocketChannel::Connect("taken.socket"); }),
+              "cannot connect to taken.socket: Connection refused");
+    {
+        const OtherProcess killed(false);
+        CHECK(ModeOf("taken.socket") == 0600 && ModeOf("taken.socket.lock") == 0600);
+        vesk::LocalSocketServer server("taken.socket", NoObjects());
+        CheckText(ErrorOfListening("taken.socket"), "another server listens on taken.socket");
+        CHECK(vesk::LocalSocketChannel::Connect("taken.socket")->GetPeer().m_process == getpid());
+    }
+    CHECK(ModeOf("taken.socket") == -1 && ModeOf("taken.socket.lock") == -1);
+    std::fclose(std::fopen("plain.socket", "w"));
+    CheckText(ErrorOfListening("plain.socket"), "cannot listen on plain.socket: it is not a socket");
+    CheckText(ErrorOfListening((std::string(200, 'x') + "/a").c_str()).substr(0, 11), "cannot open");
 
-    Client own(host.server.Port());
-    vesk::string8 text;
-    vesk::xvector<vesk::xstring> errors;
-    host.sum.nest = [&] {
-        errors.push_back(ErrorOf([&] { own.sum->Say(1, text); }));
-        errors.push_back(ErrorOf([&] { own.sum->Tell(1); }));
-        vesk::ClientConnection serving(*own.channel, [&] { host.Serve(Time(200)); });
-        const auto stub = vesk::Import<ISum>(serving, 1);
-        errors.push_back(ErrorOf([&] { vesk::ptr<ISum>(stub->Interface())->Say(2, text); }));
-    };
-    Raw raw(host);
-    raw.Send(kNest);
-    CHECK(host.Serve(Time(5000), [&] { return errors.size() == 3; }) < Time(4000));
-    CHECK(vxMakeString(errors << text << host.sum.told) ==
-          "[the object is served by the thread that calls it,none,none]xx1");
+    // Of servers that start and end at once, none has the place while another one does.
+    std::atomic<int> here = 0, most = 0, started = 0;
+    std::vector<std::thread> threads;
+    for (int i = 0; i < 4; ++i) threads.emplace_back([&] {
+        for (int k = 0; k < 200; ++k) {
+            try {
+                vesk::LocalSocketServer server("raced.socket", NoObjects());
+                most = std::max<int>(most, ++here);
+                ++started;
+                CHECK(ModeOf("raced.socket") == 0600);
+                --here;
+            } catch (vesk::RemoteError const&) {
+            }
+        }
+    });
+    for (std::thread& thread : threads) thread.join();
+    CHECK(most == 1 && started > 10);
+}
+
+// Where a token differs from what is given does not change the time: of a comparison that ends there, one would take a
+// thousandth of the other.
+void CheckConstantTime() {
+    const std::string secret(1 << 20, 'a');
+    double least[2] = {1e9, 1e9};
+    for (int i = 0; i < 20; ++i) {
+        for (int isLast : {0, 1}) {
+            std::string given = secret;
+            given[isLast ? given.size() - 1 : 0] = 'b';
+            const auto begin = Clock::now();
+            CHECK(!vesk::IsEqualInConstantTime(given, secret));
+            least[isLast] = std::min(least[isLast], std::chrono::duration<double>(Clock::now() - begin).count());
+        }
+    }
+    CHECK(least[0] > least[1] / 3 && least[1] > least[0] / 3);
+    CHECK(vesk::IsEqualInConstantTime(secret, secret) && !vesk::IsEqualInConstantTime(secret + "a", secret));
+    CHECK(!vesk::IsEqualInConstantTime("", secret) && !vesk::IsEqualInConstantTime("", ""));
 }
 
 int main() {
     Register_Project_sockets();
-    Sum sum;
-    vesk::SocketServer server(0, [&sum](vesk::Server& client) { client.Export(vesk::ptr<ISum>(&sum)); });
-    const vesk::uint16 port = server.Port();
-    std::thread serving([&server] { server.ServeUntil([] { return false; }); });
-    int right[kClients] = {};
-    std::thread clients[kClients];
-    for (int i = 0; i < kClients; ++i) clients[i] = std::thread([&right, i, port] { right[i] = Call(port); });
-    for (std::thread& client : clients) client.join();
-    server.Stop();
-    serving.join();
-    for (int count : right) {
-        if (count != kCalls + 4) vesk::xout() << count << " calls of a client went well\n";
-    }
-    CheckLeaving();
-    CheckFlood();
-    CheckDescriptors();
-    CheckMemory();
-    CheckNesting();
-    vesk::xout() << sum.sum << '\n';
+    g_transport = "a thread";
+    CheckTalk<ThreadTalk>();
+    CheckConstantTime();
+    g_rows.push_back(CheckTransport<OverTcp>);
+    g_rows.push_back(CheckTransport<OverLocalSocket>);
+    g_rows.push_back(CheckMode);
+    g_rows.push_back(CheckTakingOver);
+    for (auto row : g_rows) row();
+    vesk::xout() << g_rows.size() << '\n';
 }

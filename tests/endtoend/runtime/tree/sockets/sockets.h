@@ -1,0 +1,457 @@
+// What is tried over each transport: a server in one thread and clients in others; clients that leave, stall, flood and
+// lie; and what methods do to their own server. A transport is a struct as OverTcp in sockets.cpp.
+#pragma once
+@import "Vesk/vxObject/IObject.h"
+@import "Vesk/vxObject/SocketChannel.h"
+
+#include <sys/resource.h>
+#include <ctime>
+#include <thread>
+
+$interface+ rmi ISum : vesk::IObject {
+    void Add([in] int32 n, [in] const string8& text, [out] int32& length);
+    void Tell([in] int32 n);
+    void Say([in] int32 size, [out] string8& text);
+    void Nest([out] int32& n);
+};
+$class+ Sum isa ISum {
+public:
+    void Add(int32 n, const vesk::string8& text, int32& length) {
+        if (n < 0) throw std::invalid_argument("negative");
+        sum += n;
+        length = int32(text.size());
+    }
+    void Tell(int32 n) {
+        told += n;
+        std::this_thread::sleep_for(std::chrono::microseconds(50));
+    }
+    void Say(int32 size, vesk::string8& text) { text.assign(size, 'x'); }
+    void Nest(int32& n) {
+        if (nest) nest();
+        n = 1;
+    }
+    int32 sum = 0;
+    int32 told = 0;
+    std::function<void()> nest;
+};
+
+// What the program holds, and which of this thread's allocations fails.
+extern std::atomic<std::size_t> g_held;
+extern thread_local int t_untilFailure;
+
+// The transports, each with all that is tried over it; what goes wrong is told with this name.
+inline std::vector<void (*)()> g_rows;
+inline const char* g_transport = "";
+
+typedef std::chrono::steady_clock Clock;
+typedef std::chrono::milliseconds Time;
+typedef boost::asio::ip::tcp Tcp;
+typedef vesk::xvector<vesk::octet_t> Bytes;
+
+inline void Check(bool is, const char* what) {
+    if (!is) vesk::xout() << g_transport << ": not so: " << what << '\n';
+}
+#define CHECK(is) Check(is, #is)
+inline void CheckText(std::string const& got, std::string const& wanted) {
+    if (got != wanted) vesk::xout() << g_transport << ": got " << got << ", not " << wanted << '\n';
+}
+
+template <typename Action>
+std::string ErrorOf(Action const& action) {
+    try {
+        action();
+    } catch (vesk::RemoteError const& error) {
+        return error.what();
+    }
+    return "none";
+}
+
+struct Client {
+    explicit Client(vesk::Channel& channel, std::function<void()> serve = nullptr)
+        : connection(channel, std::move(serve)), stub(vesk::Import<ISum>(connection, 1)), sum(stub->Interface()) {}
+    vesk::ClientConnection connection;
+    std::unique_ptr<vesk::Stub> stub;
+    vesk::ptr<ISum> sum;
+};
+
+// A server without a thread, which serves until `isDone` or for so long.
+template <typename T>
+struct Host {
+    Host() : server(T::Listen([this](vesk::Server& client) { connect(client), ++connects; })) {
+        server->OnError([this](std::string const& text) { ++errors, lastError = text; });
+    }
+    Time Serve(Time time, std::function<bool()> const& isDone = nullptr) {
+        const auto begin = Clock::now();
+        server->ServeUntil([&] { return Clock::now() - begin > time || (isDone && isDone()); });
+        return std::chrono::duration_cast<Time>(Clock::now() - begin);
+    }
+    bool ServeUntilClients(std::size_t count) {
+        Serve(Time(5000), [&] { return server->Clients() == count; });
+        return server->Clients() == count;
+    }
+    Sum sum;
+    std::function<void(vesk::Server&)> connect = [this](vesk::Server& client) { client.Export(vesk::ptr<ISum>(&sum)); };
+    std::unique_ptr<typename T::Server> server;
+    int connects = 0, errors = 0;
+    std::string lastError;
+};
+
+// The same with a thread.
+template <typename T>
+struct Serving : Host<T> {
+    explicit Serving(std::function<void(vesk::Server&)> prepare = nullptr) {
+        if (prepare) this->connect = [this, prepare](vesk::Server& client) {
+            client.Export(vesk::ptr<ISum>(&this->sum));
+            prepare(client);
+        };
+        thread = std::thread([this] { this->server->ServeUntil([] { return false; }); });
+    }
+    void End() {
+        this->server->Stop();
+        if (thread.joinable()) thread.join();
+    }
+    ~Serving() { End(); }
+    std::thread thread;
+};
+
+// No allocation fails meanwhile.
+struct Spared {
+    ~Spared() { t_untilFailure = untilFailure; }
+    const int untilFailure = std::exchange(t_untilFailure, 0);
+};
+
+// A client that sends what it likes, in the thread of its server.
+template <typename T>
+struct Raw {
+    explicit Raw(Host<T>& host, bool enters = true) : stream(T::Reach(io, *host.server)) {
+        T::Begin(stream, [this](boost::system::error_code const& error) { isIn = !error; });
+        const int before = host.connects;
+        if (enters) host.Serve(Time(5000), [&] { return Has(T::Greeting) && host.connects > before; });
+        came.clear();
+    }
+    ~Raw() { T::End(stream); }
+    // Takes what has come, without waiting.
+    Raw& Poll() {
+        const Spared spared;
+        boost::system::error_code error;
+        if (!isIn) {
+            io.restart();
+            io.poll();
+        }
+        if (isIn) {
+            vesk::octet_t bytes[1000];
+            stream.lowest_layer().non_blocking(true, error);
+            while (const std::size_t size = stream.read_some(boost::asio::buffer(bytes), error)) came.insert(came.end(), bytes, bytes + size);
+            isGone = error != boost::asio::error::would_block;
+            stream.lowest_layer().non_blocking(false, error);
+        }
+        return *this;
+    }
+    bool Has(std::size_t size) { return Poll().came.size() >= size; }
+    void Write(Bytes const& bytes) {
+        boost::system::error_code error;
+        boost::asio::write(stream, boost::asio::buffer(bytes.data(), bytes.size()), error);
+    }
+    void Send(Bytes const& message, int times = 1) {
+        const Spared spared;
+        Bytes bytes;
+        for (int i = 0; i < times; ++i) {
+            bytes.insert(bytes.end(), {vesk::octet_t(message.size()), 0, 0, 0});
+            bytes.insert(bytes.end(), message.begin(), message.end());
+        }
+        Write(bytes);
+    }
+    boost::asio::io_context io;
+    typename T::Stream stream;
+    bool isIn = false, isGone = false;
+    Bytes came;
+};
+
+// Calls of the first object: a stub's bytes.
+const Bytes kTell = {1, 1, 0, 1, 0, 0, 0};
+const Bytes kSay = {1, 2, 9, 2, 0, 0, 0};
+const Bytes kNest = {1, 3, 9};
+const std::size_t kSaid = 9;
+
+const int kClients = 4;
+const int kCalls = 25;
+
+// How many calls gave what they must.
+template <typename T>
+int Call(typename T::Server& server) {
+    int right = 0;
+    const auto channel = T::Connect(server);
+    Client client(*channel);
+    client.connection.SetTimeout(Time::max());
+    channel->SetTimeout(Time::max());
+    int32 length = 0;
+    for (int i = 0; i < kCalls; ++i) {
+        client.sum->Add(1, vesk::string8(i * 1000, 'x'), length);
+        right += length == i * 1000;
+    }
+    right += ErrorOf([&] { client.sum->Add(-1, "", length); }) == "negative";
+
+    // Answers that are too long for this client alone.
+    channel->SetMessageLimit(5000);
+    vesk::string8 text;
+    for (int size : {5000, 1000000, 100}) {
+        const std::string error = ErrorOf([&] { client.sum->Say(size, text); });
+        const int bytes = size + (size > 5000 ? 5 : 4);  // with the number, the kind and the text's length
+        right += error == (size == 100 ? std::string("none") : vesk::TooLongText(bytes, 5000));
+    }
+    return right;
+}
+
+template <typename T>
+void CheckCalls() {
+    Serving<T> host;
+    int right[kClients] = {};
+    std::thread clients[kClients];
+    for (int i = 0; i < kClients; ++i) clients[i] = std::thread([&, i] { right[i] = Call<T>(*host.server); });
+    for (std::thread& client : clients) client.join();
+    host.End();
+    for (int count : right) CHECK(count == kCalls + 4);
+    CHECK(host.sum.sum == kClients * kCalls);
+}
+
+// Who ends its sending gets its answers; who leaves is served, but for what leads to nothing.
+template <typename T>
+void CheckLeaving() {
+    Host<T> host;
+    {
+        Raw<T> raw(host);
+        raw.Send(kSay, 2);
+        T::End(raw.stream);
+        host.Serve(Time(5000), [&] { return raw.Has(2 * kSaid); });
+        CHECK(raw.came == (Bytes{5, 0, 0, 0, 9, 0, 2, 'x', 'x', 5, 0, 0, 0, 9, 0, 2, 'x', 'x'}));
+        CHECK(host.ServeUntilClients(0));
+    }
+    Raw<T>(host).Send(kTell, 300);
+    host.Serve(Time(5000), [&] { return host.sum.told == 300; });
+    Raw<T>(host).Send({}, 20000);
+    host.Serve(Time(20000), [&] { return host.errors > 0 && host.server->Clients() == 0; });
+    CHECK(host.sum.told == 300 && host.errors > 0 && host.errors < 1000 && host.server->Clients() == 0);
+}
+
+// The end is kept, others are served and memory is bounded while one client sends more than can be carried out.
+template <typename T>
+void CheckFlood() {
+    Host<T> host;
+    host.server->SetMessageLimit(100000);
+    Raw<T> other(host), flood(host);
+    const std::size_t before = g_held;
+    std::size_t most = 0;
+    std::thread sending([&flood] {
+        for (int i = 0; i < 1000; ++i) flood.Send(kTell, 1000);  // 11 MB
+    });
+    other.Send(kSay);
+    host.Serve(Time(5000), [&] { return host.sum.told > 0 && other.Has(kSaid); });
+    CHECK(host.sum.told < 1000);
+    auto measure = [&] {
+        most = std::max<std::size_t>(most, g_held);
+        return false;
+    };
+    host.Serve(Time(20000), [&] { return measure() || most - before > 100000; });  // until the flood is there
+    CHECK(host.Serve(Time(600), measure) < Time(2000));
+    CHECK(most - before > 100000 && most - before < 400000);
+    CHECK(host.server->Clients() == 2);
+    shutdown(flood.stream.lowest_layer().native_handle(), SHUT_RDWR);
+    sending.join();
+}
+
+// At the limit of descriptors the clients that are there are served, those that wait later, and nothing spins.
+template <typename T>
+void CheckDescriptors() {
+    Host<T> host;
+    Raw<T> first(host), second(host, false), third(host, false);
+    rlimit limit;
+    getrlimit(RLIMIT_NOFILE, &limit);
+    const rlimit none = {0, limit.rlim_max};
+    setrlimit(RLIMIT_NOFILE, &none);
+    const std::clock_t before = std::clock();
+    first.Send(kSay);
+    CHECK(host.Serve(Time(500)) < Time(1500));
+    CHECK(std::clock() - before < CLOCKS_PER_SEC / 4);
+    CHECK(first.Has(kSaid) && host.server->Clients() == 1);
+    setrlimit(RLIMIT_NOFILE, &limit);
+    host.Serve(Time(5000), [&] { return second.Poll().isIn && third.Poll().isIn && host.server->Clients() == 3; });
+    CHECK(host.server->Clients() == 3);
+}
+
+// Where memory runs out, at whatever place, a client may be lost; the server serves the next one.
+template <typename T>
+void CheckMemory() {
+    Host<T> host;
+    bool hasFailed = true;
+    int runs = 0;
+    for (; hasFailed; ++runs) {
+        {
+            Raw<T> raw(host, false);
+            bool isServing = false, isSent = false, isServed = false;
+            host.Serve(Time(100), [&] {
+                if (!std::exchange(isServing, true)) t_untilFailure = runs + 1;
+                if (raw.Poll().isIn && !std::exchange(isSent, true)) raw.Send(kSay);
+                return isServed = raw.Has(T::Greeting + kSaid);
+            });
+            hasFailed = t_untilFailure <= 0;
+            t_untilFailure = 0;
+            CHECK(hasFailed || isServed);
+        }
+        Raw<T> next(host);
+        next.Send(kSay);
+        host.Serve(Time(5000), [&] { return next.Has(kSaid); });
+        CHECK(next.came.size() == kSaid);
+    }
+    CHECK(runs > 5);
+    CHECK(host.ServeUntilClients(0));
+}
+
+// Methods that serve while they are called by a client that leaves, and that call their own server.
+template <typename T>
+void CheckNesting() {
+    Host<T> host;
+    Raw<T>(host).Send(kNest);
+    host.sum.nest = [&] { host.Serve(Time(200)); };
+    host.Serve(Time(500));
+    CHECK(host.server->Clients() == 0);
+
+    std::unique_ptr<typename T::Channel> channel;
+    std::atomic<bool> isConnected = false;
+    std::thread connecting([&] { channel = T::Connect(*host.server), isConnected = true; });
+    host.Serve(Time(5000), [&] { return isConnected.load(); });
+    connecting.join();
+    Client own(*channel);
+    vesk::string8 text;
+    vesk::xvector<vesk::xstring> errors;
+    host.sum.nest = [&] {
+        errors.push_back(ErrorOf([&] { own.sum->Say(1, text); }));
+        errors.push_back(ErrorOf([&] { own.sum->Tell(1); }));
+        vesk::ClientConnection serving(*channel, [&] { host.Serve(Time(200)); });
+        const auto stub = vesk::Import<ISum>(serving, 1);
+        errors.push_back(ErrorOf([&] { vesk::ptr<ISum>(stub->Interface())->Say(2, text); }));
+    };
+    Raw<T> raw(host);
+    raw.Send(kNest);
+    CHECK(host.Serve(Time(5000), [&] { return errors.size() == 3; }) < Time(4000));
+    CheckText(vxMakeString(errors << text << host.sum.told), "[the object is served by the thread that calls it,none,none]xx1");
+}
+
+// Clients that send half of a message, or nothing: others are served meanwhile, and they go when their time is over.
+template <typename T>
+void CheckSlow() {
+    Host<T> host;
+    host.server->SetIdleTime(Time(400));
+    Raw<T> half(host), head(host), silent(host), busy(host);
+    half.Write({100, 0, 0, 0, 1});
+    head.Write({7});
+    int answers = 0, sent = 0;
+    const auto begin = Clock::now();
+    host.Serve(Time(1500), [&] {
+        if (busy.Has(answers * kSaid) && Clock::now() - begin > Time(100) * answers) ++answers, busy.Send(kSay);
+        if (Clock::now() - begin > Time(50) * sent) ++sent, half.Write({0});  // a byte now and then keeps nobody there
+        return false;
+    });
+    CHECK(host.server->Clients() == 1 && answers > 5 && !busy.isGone);
+    CHECK(half.Poll().isGone && head.Poll().isGone && silent.Poll().isGone);
+}
+
+// Who has given no token: so many clients, for so long.
+template <typename T>
+void CheckEntry() {
+    Host<T> host;
+    host.connect = [&](vesk::Server& client) {
+        client.AddToken("of sixteen bytes or more");
+        client.Export(vesk::ptr<ISum>(&host.sum));
+    };
+    host.server->SetEntryLimits(2, Time(600));
+    std::list<Raw<T>> raws;
+    for (int i = 0; i < 4; ++i) host.Serve(Time(50)), raws.emplace_back(host);
+    host.Serve(Time(100));
+    auto gone = [&] {
+        int count = 0;
+        for (Raw<T>& raw : raws) count += raw.Poll().isGone;
+        return count;
+    };
+    CHECK(gone() == 2 && raws.front().isGone && !raws.back().isGone);
+    raws.back().Send(kSay);
+    host.Serve(Time(5000), [&] { return raws.back().Poll().isGone; });
+    CheckText(host.lastError, "the server asks for a token first");
+    CHECK(raws.back().came.size() > kSaid && raws.back().came[5] == vesk::AN_ERROR);
+    host.Serve(Time(5000), [&] { return gone() == 4; });
+    CHECK(gone() == 4 && host.server->Clients() == 0);
+    CHECK(host.lastError.find(" did not prove in time who it is") != std::string::npos);
+    // A long message of somebody who has not given a token is not kept.
+    Raw<T> large(host);
+    large.Write({0, 32, 0, 0});
+    host.Serve(Time(500), [&] { return large.Poll().isGone; });
+    CHECK(large.isGone);
+}
+
+// What is the same over LocalChannel: who may call what, and numbers that are wrong or come twice.
+template <typename Talk>
+void CheckTalk() {
+    const std::string token = "of sixteen bytes or more";
+    std::string asked;
+    Talk talk([&](vesk::Server& server) {
+        CHECK(ErrorOf([&] { server.AddToken("short"); }) == "a token has at least 16 bytes");
+        server.AddToken(token, "writer");
+        server.AddToken("another of sixteen bytes", "reader");
+        server.Authorize([&](std::string interface, std::string method, vesk::Peer const& peer) {
+            if (method == "Tell") throw std::runtime_error("not on Fridays");
+            asked += interface + "." + method + " " + peer.m_token + ";";
+            Talk::CheckPeer(peer);
+            return method != "Nest";
+        });
+    });
+    vesk::string8 text;
+    int32 n = 0;
+    for (bool isWrong : {false, true}) {
+        const auto channel = talk.Connect();
+        Client client(*channel, talk);
+        CheckText(ErrorOf([&] { isWrong ? client.connection.GiveToken(token + " ") : client.sum->Say(2, text); }),
+                  isWrong ? "not a token of the server" : "the server asks for a token first");
+        if (!Talk::IsOneThread) CheckText(ErrorOf([&] { client.sum->Say(2, text); }), "the other side is gone");
+    }
+    const auto channel = talk.Connect();
+    Client client(*channel, talk);
+    client.connection.GiveToken(token);
+    client.sum->Say(2, text);
+    CHECK(text == "xx");
+    const std::string refused = ErrorOf([&] { client.sum->Nest(n); });
+    CHECK(refused.find(" with the token writer may not call ISum.Nest") != std::string::npos);
+    client.sum->Tell(1);  // nobody hears why not
+    const auto lost = vesk::Import<ISum>(client.connection, 9);
+    CheckText(ErrorOf([&] { vesk::ptr<ISum>(lost->Interface())->Say(1, text); }), "no such remote object");
+    // A call that is sent again is carried out again; answers that nobody waits for are dropped.
+    for (int i = 0; i < 3; ++i) channel->Send({1, 0, 1, 5, 0, 0, 0, 0});
+    channel->Send({1, 9, 2});
+    client.sum->Add(1, "abc", n);
+    CHECK(n == 3);
+    talk.End();
+    CheckText(asked, "ISum.Say writer;ISum.Nest writer;ISum.Add writer;ISum.Add writer;ISum.Add writer;ISum.Add writer;");
+    CHECK(talk.sum.sum == 16 && talk.sum.told == 0);
+}
+
+// Over a transport.
+template <typename T>
+struct SocketTalk : Serving<T> {
+    static constexpr bool IsOneThread = false;
+    using Serving<T>::Serving;
+    auto Connect() { return T::Connect(*this->server); }
+    static void CheckPeer(vesk::Peer const& peer) { T::CheckPeer(peer); }
+    operator std::function<void()>() const { return nullptr; }
+};
+
+template <typename T>
+void CheckTransport() {
+    g_transport = T::Name;
+    CheckCalls<T>();
+    CheckLeaving<T>();
+    CheckFlood<T>();
+    CheckDescriptors<T>();
+    CheckMemory<T>();
+    CheckNesting<T>();
+    CheckSlow<T>();
+    CheckEntry<T>();
+    CheckTalk<SocketTalk<T>>();
+}
