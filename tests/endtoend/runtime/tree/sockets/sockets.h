@@ -387,6 +387,42 @@ void CheckEntry() {
     CHECK(large.isGone);
 }
 
+// A server whose answers have wrong numbers, and come twice: the client takes those that it waits for.
+template <typename T>
+void CheckLies() {
+    typedef typename T::Server::Protocol Protocol;
+    const auto io = std::make_shared<boost::asio::io_context>();
+    typename Protocol::acceptor acceptor(*io, T::AnyPlace());
+    std::thread lying([&] {
+        auto context = T::LiarContext();
+        auto stream = T::Transport::Make(acceptor.accept(), context);
+        T::Accept(stream);
+        vesk::StreamChannel<typename T::Transport> channel(io, std::move(stream), false);
+        if (T::Greeting) channel.Send({});
+        Bytes call;
+        for (vesk::octet_t letter : {'x', 'z'}) {
+            CHECK(channel.ReceiveWithin(call, Time(5000)));
+            const vesk::octet_t number = call[2];
+            channel.Send({vesk::octet_t(number + 1), vesk::AN_VALUES, 1, 'a'});
+            channel.Send({number, vesk::AN_VALUES, 1, letter});
+            channel.Send({number, vesk::AN_VALUES, 1, 'b'});
+        }
+        CHECK(channel.ReceiveWithin(call, Time(5000)));
+        channel.Send({call[2], vesk::AN_VALUES, 255, 255, 255, 255, 15, 'c'});
+        channel.Receive(call);
+    });
+    const auto channel = T::ConnectTo(acceptor.local_endpoint());
+    Client client(*channel);
+    vesk::string8 text;
+    for (const char* letter : {"x", "z"}) {
+        client.sum->Say(1, text);
+        CHECK(text == letter);
+    }
+    CheckText(ErrorOf([&] { client.sum->Say(1, text); }).substr(0, 12), "bad answer: ");
+    CheckText(ErrorOf([&] { client.sum->Say(1, text); }), "the other side is gone");
+    lying.join();
+}
+
 // What is the same over LocalChannel: who may call what, and numbers that are wrong or come twice.
 template <typename Talk>
 void CheckTalk() {
@@ -453,5 +489,6 @@ void CheckTransport() {
     CheckNesting<T>();
     CheckSlow<T>();
     CheckEntry<T>();
+    CheckLies<T>();
     CheckTalk<SocketTalk<T>>();
 }

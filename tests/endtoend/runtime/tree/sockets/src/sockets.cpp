@@ -25,6 +25,9 @@ void operator delete(void* memory, std::size_t) noexcept { operator delete(memor
 
 struct PlainStream {
     static constexpr std::size_t Greeting = 0;
+    static vesk::PlainTransport::Context LiarContext() { return {}; }
+    template <typename Stream>
+    static void Accept(Stream&) {}
     template <typename Stream, typename Handler>
     static void Begin(Stream&, Handler handler) {
         handler(boost::system::error_code());
@@ -40,9 +43,12 @@ struct OverTcp : PlainStream {
     static constexpr const char* Name = "TCP";
     typedef vesk::SocketServer Server;
     typedef vesk::SocketChannel Channel;
+    typedef vesk::TcpTransport Transport;
     typedef Tcp::socket Stream;
     static auto Listen(Server::ConnectFunction connect) { return std::make_unique<Server>(0, std::move(connect)); }
     static auto Connect(Server& server) { return Channel::Connect("127.0.0.1", server.Port()); }
+    static Tcp::endpoint AnyPlace() { return {boost::asio::ip::address_v4::loopback(), 0}; }
+    static auto ConnectTo(Tcp::endpoint const& place) { return Channel::Connect("127.0.0.1", place.port()); }
     static Stream Reach(boost::asio::io_context& io, Server& server) {
         Stream stream(io);
         stream.connect(Tcp::endpoint(boost::asio::ip::address_v4::loopback(), server.Port()));
@@ -57,9 +63,15 @@ struct OverLocalSocket : PlainStream {
     static constexpr const char* Name = "Unix sockets";
     typedef vesk::LocalSocketServer Server;
     typedef vesk::LocalSocketChannel Channel;
-    typedef vesk::LocalSocketTransport::Stream Stream;
+    typedef vesk::LocalSocketTransport Transport;
+    typedef Transport::Stream Stream;
     static auto Listen(Server::ConnectFunction connect) { return std::make_unique<Server>("a.socket", std::move(connect)); }
     static auto Connect(Server& server) { return Channel::Connect(server.Path()); }
+    static auto AnyPlace() {
+        unlink("liar.socket");
+        return "liar.socket";
+    }
+    static auto ConnectTo(Transport::Protocol::endpoint const& place) { return Channel::Connect(place.path()); }
     static Stream Reach(boost::asio::io_context& io, Server& server) {
         Stream stream(io);
         stream.connect(server.Path());

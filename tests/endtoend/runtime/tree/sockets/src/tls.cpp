@@ -12,13 +12,18 @@ struct OverTls {
     static constexpr std::size_t Greeting = 4;
     typedef vesk::TlsServer Server;
     typedef vesk::TlsChannel Channel;
-    typedef vesk::TlsTransport::Stream Stream;
+    typedef vesk::TlsTransport Transport;
+    typedef Transport::Stream Stream;
     static auto Listen(Server::ConnectFunction connect) {
         return std::make_unique<Server>(0, kServer, std::move(connect));
     }
     static auto Connect(Server& server) { return Channel::Connect("localhost", server.Port(), kAda); }
+    static Tcp::endpoint AnyPlace() { return {boost::asio::ip::address_v4::loopback(), 0}; }
+    static auto ConnectTo(Tcp::endpoint const& place) { return Channel::Connect("localhost", place.port(), kAda); }
+    static Transport::Context LiarContext() { return Transport::MakeContext(kServer, true); }
+    static void Accept(Stream& stream) { stream.handshake(Transport::Server); }
     static Stream Reach(boost::asio::io_context& io, Server& server) {
-        static vesk::TlsTransport::Context context = vesk::TlsTransport::MakeContext(kAda, false);
+        static Transport::Context context = Transport::MakeContext(kAda, false);
         Stream stream(io, *context);
         stream.next_layer().connect(Tcp::endpoint(boost::asio::ip::address_v4::loopback(), server.Port()));
         return stream;
@@ -136,6 +141,32 @@ void CheckOthers() {
     serving.join();
 }
 
+// Those that never finish their handshake keep nobody out, and go.
+void CheckSilent() {
+    Host<OverTls> host;
+    host.server->SetEntryLimits(3, Time(1000));
+    boost::asio::io_context io;
+    std::list<Tcp::socket> silent;
+    for (int i = 0; i < 10; ++i) {
+        silent.emplace_back(io).connect({boost::asio::ip::address_v4::loopback(), host.server->Port()});
+        if (i % 2) boost::asio::write(silent.back(), boost::asio::buffer("\x16\x03\x01\x02", 4));
+    }
+    const auto begin = Clock::now();
+    Raw<OverTls> raw(host);
+    raw.Send(kSay);
+    host.Serve(Time(5000), [&] { return raw.Has(kSaid); });
+    CHECK(raw.Has(kSaid) && Clock::now() - begin < Time(900));
+    host.Serve(Time(5000), [&] { return host.errors >= 2; });
+    for (Tcp::socket& socket : silent) {
+        char byte;
+        boost::system::error_code error;
+        socket.non_blocking(true);
+        socket.read_some(boost::asio::buffer(&byte, 1), error);
+        CHECK(error && error != boost::asio::error::would_block);
+    }
+    CHECK(host.server->Clients() == 1);
+}
+
 // Who has a token needs no certificate.
 void CheckToken() {
     g_files = {"server.pem", "server.key", ""};
@@ -155,4 +186,5 @@ static const bool s_isThere = (g_rows.push_back([] {
     CheckCertificates();
     CheckOthers();
     CheckToken();
+    CheckSilent();
 }), true);
