@@ -1,12 +1,12 @@
-// Remote calls between processes of this machine over a Unix socket, as SocketChannel.h has them over TCP. Its file lets in
-// its owner (and root) from the first moment, and both sides can ask whose process the other one is: GetPeer().
+// Remote calls between processes of this machine over a Unix socket, as SocketChannel.h has them over TCP. Its file
+// lets in its owner (and root) from the first moment, and both sides can ask whose process the other one is: GetPeer().
 //
 //   vesk::LocalSocketServer server(path, [&](vesk::Server& client) { client.Export(board); });
 //   const auto channel = vesk::LocalSocketChannel::Connect(path);
 //
-// Beside the file is a lock, PATH.lock, which a server holds as long as it lives: of two that start at once, one has it. The
-// socket that a killed server left is replaced by who has the lock; where one answers that has none, it is not. Keep both in
-// a folder that others cannot write to, as that of XDG_RUNTIME_DIR. For systems with SO_PEERCRED, as Linux.
+// Beside the file is a lock, PATH.lock, which a server holds as long as it lives: of two that start at once, one has
+// it. The socket that a killed server left is replaced by who has the lock; where one answers that has none, it is not.
+// Keep both in a folder that others cannot write to, as that of XDG_RUNTIME_DIR. For Linux, which has SO_PEERCRED.
 
 @import "Vesk/vxObject/StreamServer.h"
 
@@ -92,7 +92,7 @@ class LocalSocketChannel : public StreamChannel<LocalSocketTransport> {
 
 class LocalSocketServer : public StreamServer<LocalSocketTransport> {
  public:
-  // RemoteError when another server listens there, when the path cannot be had, and when what stands there is no socket.
+  // RemoteError when another server listens there, or the path cannot be had, or is not that of a socket.
   LocalSocketServer(std::string const& path, ConnectFunction connect)
       : StreamServer(std::move(connect)), m_path(path), m_lock(path) {
     RemoveStale();
@@ -105,8 +105,8 @@ class LocalSocketServer : public StreamServer<LocalSocketTransport> {
   }
   ~LocalSocketServer() {
     struct stat there;
-    const bool isOurs = lstat(m_path.c_str(), &there) == 0 && there.st_ino == m_file.st_ino && there.st_dev == m_file.st_dev;
-    if (isOurs) unlink(m_path.c_str());
+    if (lstat(m_path.c_str(), &there) != 0) return;
+    if (there.st_ino == m_file.st_ino && there.st_dev == m_file.st_dev) unlink(m_path.c_str());
   }
   std::string const& Path() const { return m_path; }
 
@@ -123,7 +123,8 @@ class LocalSocketServer : public StreamServer<LocalSocketTransport> {
     if (::connect(probe.native_handle(), place.data(), static_cast<socklen_t>(place.size())) == 0 || errno == EAGAIN) {
       throw RemoteError("another server listens on " + m_path);
     }
-    if (unlink(m_path.c_str()) != 0) throw RemoteError("cannot remove " + m_path + ": " + std::generic_category().message(errno));
+    if (unlink(m_path.c_str()) == 0) return;
+    throw RemoteError("cannot remove " + m_path + ": " + std::generic_category().message(errno));
   }
 
   static Protocol::endpoint Place(std::string const& path) {

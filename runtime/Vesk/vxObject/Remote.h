@@ -9,7 +9,8 @@
 // LocalChannel in one process, SocketChannel.h, LocalSocketChannel.h and TlsChannel.h between processes, or a class of
 // one's own. A connection, a server and what they call belong to one thread.
 //
-// A server may ask who calls: for a token ahead of all calls, and by a function for each. A token is a call of the object 0.
+// A server may ask who calls: for a token ahead of all calls, and by a function for each. A token is given by a call of
+// the object 0.
 
 @import "Vesk/vxObject/Channel.h"
 @import "Vesk/vxObject/Persist.h"
@@ -290,7 +291,7 @@ class Server {
   // no record) and with who calls. False refuses the call, and so does what it throws, whose text the caller gets.
   typedef std::function<bool(ConstStringZ, ConstStringZ, Peer const&)> AuthorizeFunction;
   void Authorize(AuthorizeFunction function) { m_authorize = std::move(function); }
-  // Until the other side has given one of the tokens, nothing is carried out. RemoteError for one of less than 16 bytes.
+  // Until the other side has given one of the tokens, nothing is carried out. RemoteError for less than 16 bytes.
   void AddToken(xstring token, xstring name = "token");
   bool WaitsForToken() const { return !m_tokens.empty() && m_peer.m_token.empty(); }
   // Who is on the other side; for the connect function of a server over sockets, and later.

@@ -1,10 +1,10 @@
 // What every channel over a stream of bytes shares: each message is its length in four bytes, little-endian, and its
-// bytes. SocketChannel.h has TCP, LocalSocketChannel.h Unix sockets, TlsChannel.h TLS; StreamServer.h what serves them. It
-// needs Boost.Asio (Debian's libboost-dev, headers alone).
+// bytes. SocketChannel.h has TCP, LocalSocketChannel.h Unix sockets, TlsChannel.h TLS; StreamServer.h what serves them.
+// It needs Boost.Asio (Debian's libboost-dev, headers alone).
 //
-// Messages that wait are kept as the bytes that came, so that the other side's take no memory beyond the limit: one that
-// sends faster than it is served waits. A read is begun just before its end is waited for, not as soon as the one before
-// it is done: so the system is asked for what cannot have come while the other side works, not while it waits.
+// Messages that wait are kept as the bytes that came, so that the other side's take no memory beyond the limit: one
+// that sends faster than it is served waits. A read is begun just before its end is waited for, not as soon as the one
+// before it is done: so the system is asked for what cannot have come while the other side works, not while it waits.
 
 @import "Vesk/vxObject/MessageFrames.h"
 @import "Vesk/vxObject/Remote.h"
@@ -47,7 +47,7 @@ struct ServingHere {
 template <typename Protocol>
 inline thread_local ServingHere<Protocol> const* t_servingHere = nullptr;
 
-// One end of a stream. It lives as long as an operation is under way; one that cannot go on, for want of memory, closes it.
+// One end of a stream. It lives as long as an operation is under way. One that lacks memory to go on closes it.
 template <typename Transport>
 class StreamEnd : public std::enable_shared_from_this<StreamEnd<Transport>> {
  public:
@@ -180,6 +180,7 @@ class StreamEnd : public std::enable_shared_from_this<StreamEnd<Transport>> {
     }
   }
   void EndRead(boost::system::error_code const& error, std::size_t size) {
+    if (m_hasEnded) return;
     if (error == boost::asio::error::eof && !m_waits) {
       m_hasEnded = true;
     } else if (error) {
@@ -222,7 +223,8 @@ class StreamEnd : public std::enable_shared_from_this<StreamEnd<Transport>> {
   // What a caller got already is still good; of who calls no more nothing is.
   void Fail(boost::system::error_code const& error) {
     if constexpr (Transport::kHandshakes) {
-      if (!m_hasFailed && error != boost::asio::error::operation_aborted) m_failure = Transport::TextOf(error, m_stream);
+      const bool isFirst = !m_hasFailed && error != boost::asio::error::operation_aborted;
+      if (isFirst) m_failure = Transport::TextOf(error, m_stream);
     }
     m_hasFailed = true;
     m_waits ? Close() : Drop();

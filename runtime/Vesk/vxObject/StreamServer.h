@@ -1,10 +1,10 @@
-// Serves any number of clients over streams in one thread. Each has a Server of its own, so that its numbers mean nothing
-// to others. A client that must prove who it is, by a handshake or a token, has a while for it; there is room for so many
-// such clients, and another one takes the place of the oldest, so that none keeps others out.
+// Serves any number of clients over streams in one thread. Each has a Server of its own, so that its numbers mean
+// nothing to others. A client that must prove who it is, by a handshake or a token, has a while for it; there is room
+// for so many such clients, and another one takes the place of the oldest, so that none keeps others out.
 //
-// Messages that wait are kept as the bytes that came, so that a client's take no memory beyond the limit: one that sends
-// faster than it is served, or does not read its answers, waits; one that sends a longer message is disconnected. An
-// answer that is too long for a client is an error of the call that it belongs to.
+// Messages that wait are kept as the bytes that came, so that a client's take no memory beyond the limit: one that
+// sends faster than it is served, or does not read its answers, waits; one that sends a longer message is disconnected.
+// An answer that is too long for a client is an error of the call that it belongs to.
 
 @import "Vesk/vxObject/StreamChannel.h"
 
@@ -18,8 +18,8 @@ class StreamServer {
  public:
   typedef typename Transport::Protocol Protocol;
   typedef std::chrono::milliseconds Time;
-  // Exports what a new client may call, and says by Server::Authorize and Server::AddToken who may. A client for which it
-  // throws is disconnected.
+  // Exports what a new client may call, and says by Server::Authorize and Server::AddToken who may. A client for which
+  // it throws is disconnected.
   typedef std::function<void(Server&)> ConnectFunction;
 
   StreamServer(StreamServer const&) = delete;
@@ -35,8 +35,11 @@ class StreamServer {
   }
   // Of each message of the clients to come.
   void SetMessageLimit(std::size_t bytes) { m_messageLimit = bytes; }
-  // Who sends no whole message for so long, and has no call under way, is disconnected; 0, as it is at first: nobody is.
-  void SetIdleTime(Time time) { m_idleTime = time; }
+  // Who sends no whole message for so long, and has no call under way, is disconnected; at 0, as at first, nobody is.
+  void SetIdleTime(Time time) {
+    m_idleTime = time;
+    for (Client& client : m_clients) client.m_since = Clock::now();
+  }
   void OnError(Server::ErrorFunction function) { m_onError = std::move(function); }
 
   // Serves until `isDone`, which is asked at each event and message and ten times a second, or until Stop. A method may
@@ -95,8 +98,8 @@ class StreamServer {
         : m_channel(std::move(io), std::move(stream), false), m_server(m_channel) {}
     StreamChannel<Transport> m_channel;
     Server m_server;
-    int m_depth = 0;           // of methods that it waits for
-    bool m_isIntroduced = false;  // the handshake is done, and its objects are exported
+    int m_depth = 0;                           // of methods that it waits for
+    bool m_isIntroduced = false;               // the handshake is done, and its objects are exported
     Clock::time_point m_since = Clock::now();  // when it came, or was last active
   };
   typedef std::list<Client> ClientList;
@@ -170,8 +173,10 @@ class StreamServer {
       client.m_server.SetMessageLimit(m_messageLimit);
       client.m_server.OnError(m_onError);
       m_connect(client.m_server);
-      client.m_channel.SetMessageLimit(client.m_server.WaitsForToken() ? std::min(kTokenLimit, m_messageLimit) : m_messageLimit);
-      if constexpr (Transport::kHandshakes) client.m_channel.Send({});  // a client must hear that its certificate is taken
+      const std::size_t limit = client.m_server.WaitsForToken() ? kTokenLimit : m_messageLimit;
+      client.m_channel.SetMessageLimit(std::min(limit, m_messageLimit));
+      // A client must hear that its certificate is taken.
+      if constexpr (Transport::kHandshakes) client.m_channel.Send({});
     } catch (std::exception const& error) {
       Report(error.what());
       client.m_channel.Drop();
@@ -195,10 +200,18 @@ class StreamServer {
       }
     }
   }
-  // Drops who has not entered in time, and who is idle.
+  // Drops who has not entered in time, and who is idle. For as long as this thread did something else, nobody is late.
   void EndLate() {
-    if (m_entering.empty() && m_idleTime == Time(0)) return;
+    if (m_entering.empty() && m_idleTime == Time(0)) {
+      m_lastLook = Clock::time_point();
+      return;
+    }
     const auto now = Clock::now();
+    const auto before = std::exchange(m_lastLook, now);
+    const bool wasAway = before != Clock::time_point() && now - before > Time(300);
+    for (ClientList* clients : {&m_clients, &m_entering}) {
+      for (auto at = clients->begin(); wasAway && at != clients->end(); ++at) at->m_since += now - before;
+    }
     for (Client& client : m_entering) {
       if (client.m_depth > 0 || now - client.m_since < m_entryTime || !client.m_channel.IsOpen()) continue;
       Report((PeerText(client.m_server.GetPeer()) + " did not prove in time who it is").c_str());
@@ -206,7 +219,9 @@ class StreamServer {
     }
     if (m_idleTime == Time(0)) return;
     for (Client& client : m_clients) {
-      if (client.m_depth == 0 && now - client.m_since >= m_idleTime) client.m_channel.Drop();
+      if (client.m_depth == 0 && !client.m_channel.CanServe() && now - client.m_since >= m_idleTime) {
+        client.m_channel.Drop();
+      }
     }
   }
 
@@ -274,6 +289,7 @@ class StreamServer {
   std::atomic<bool> m_stops{false};
   bool m_isAccepting = false;
   Clock::time_point m_acceptAgain;
+  Clock::time_point m_lastLook;  // for who is late; none while nobody can be
   ClientList m_clients;
   ClientList m_entering;  // in the order in which they came
 };

@@ -1,6 +1,6 @@
-// Remote calls over TLS 1.3: encrypted, the server's name proved by its certificate, and the client's by one of its own or
-// by a token. It needs Boost.Asio and OpenSSL (Debian's libboost-dev and libssl-dev; -lssl -lcrypto), and nothing else
-// includes it.
+// Remote calls over TLS 1.3: encrypted, the server's name proved by its certificate, and the client's by one of its own
+// or by a token. It needs Boost.Asio and OpenSSL (Debian's libboost-dev and libssl-dev; -lssl -lcrypto), and nothing
+// else includes it.
 //
 //   vesk::TlsServer server(4711, {"server.pem", "server.key", "authority.pem"}, [&](vesk::Server& client) {
 //     client.Authorize([](auto interface, auto method, vesk::Peer const& peer) { return peer.m_subject == "CN=ada"; });
@@ -8,8 +8,8 @@
 //   });
 //   const auto channel = vesk::TlsChannel::Connect("example.org", 4711, {"ada.pem", "ada.key", "authority.pem"});
 //
-// When a client has shown its certificate, it does not know yet whether that is taken: a server that lets it in says so by
-// an empty message. Sessions are not resumed, so that each connection is judged anew.
+// When a client has shown its certificate, it does not know yet whether that is taken: a server that lets it in says so
+// by an empty message. Sessions are not resumed, so that each connection is judged anew.
 
 @import "Vesk/vxObject/SocketChannel.h"
 
@@ -79,7 +79,8 @@ inline TlsTransport::Context TlsTransport::MakeContext(TlsFiles const& files, bo
 }
 
 inline std::string TlsTransport::SubjectOf(Stream& stream) {
-  const std::unique_ptr<X509, void (*)(X509*)> certificate(SSL_get1_peer_certificate(stream.native_handle()), X509_free);
+  SSL* const native = stream.native_handle();
+  const std::unique_ptr<X509, void (*)(X509*)> certificate(SSL_get1_peer_certificate(native), X509_free);
   const std::unique_ptr<BIO, int (*)(BIO*)> out(BIO_new(BIO_s_mem()), BIO_free);
   if (!certificate || !out) return "";
   // Commas and the like within a name are escaped, so that no name looks like two.
@@ -133,7 +134,7 @@ class TlsChannel : public StreamChannel<TlsTransport> {
   using StreamChannel::StreamChannel;
 
   // RemoteError when nobody listens there, the server has another name than `host`, or does not take the certificate;
-  // RemoteTimeout when it does not say so in time.
+  // RemoteTimeout when it does not say so within the time, which begins when it is reached.
   static std::unique_ptr<TlsChannel> Connect(std::string const& host, uint16 port, TlsFiles const& files,
                                              std::chrono::milliseconds time = std::chrono::seconds(10)) {
     const auto context = TlsTransport::MakeContext(files, false);
@@ -164,8 +165,10 @@ class TlsChannel : public StreamChannel<TlsTransport> {
     while (IsOpen() && !HasMessage()) {
       if (!RunOneUntil(end)) throw RemoteTimeout("cannot connect to " + host + ": no TLS handshake in time");
     }
-    if (!Receive(message)) throw RemoteError("cannot connect to " + host + ": " + (Failure().empty() ? "refused" : Failure()));
-    if (!message.empty()) throw RemoteError("cannot connect to " + host + ": it does not serve remote calls");
+    const bool has = Receive(message);
+    if (has && message.empty()) return;
+    const std::string why = Failure().empty() ? "refused" : Failure();
+    throw RemoteError("cannot connect to " + host + ": " + (has ? "it does not serve remote calls" : why));
   }
 };
 
@@ -175,14 +178,14 @@ class TlsServer : public StreamServer<TlsTransport> {
   // connect function must ask each client for a token.
   TlsServer(uint16 port, TlsFiles const& files, ConnectFunction connect,
             boost::asio::ip::address const& address = boost::asio::ip::address_v4::loopback())
-      : StreamServer(WithProof(std::move(connect), !files.m_authority.empty()), TlsTransport::MakeContext(files, true)) {
+      : StreamServer(WithProof(std::move(connect), files), TlsTransport::MakeContext(files, true)) {
     Listen(Protocol::endpoint(address, port), vxMakeString("port " << port));
   }
   uint16 Port() const { return Endpoint().port(); }
 
  private:
-  static ConnectFunction WithProof(ConnectFunction connect, bool asksForCertificates) {
-    if (asksForCertificates) return connect;
+  static ConnectFunction WithProof(ConnectFunction connect, TlsFiles const& files) {
+    if (!files.m_authority.empty()) return connect;
     return [connect = std::move(connect)](Server& client) {
       connect(client);
       if (!client.WaitsForToken()) throw RemoteError("the server asks for neither a certificate nor a token");

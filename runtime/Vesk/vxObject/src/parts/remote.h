@@ -45,7 +45,8 @@ std::chrono::steady_clock::time_point EndOf(std::chrono::milliseconds time) {
 }
 
 xstring PeerText(Peer const& peer) {
-  static constexpr ConstStringZ kKinds[] = {"someone", "this thread", "a client over TCP", "a local process", "a client over TLS"};
+  static constexpr ConstStringZ kKinds[] = {"someone", "this thread", "a client over TCP", "a local process",
+                                            "a client over TLS"};
   const std::string token = peer.m_token.empty() ? "" : " with the token " + peer.m_token;
   std::string who = kKinds[peer.m_kind];
   if (peer.m_user >= 0) who = "user " + std::to_string(peer.m_user);
