@@ -106,10 +106,11 @@ def make_certificates(workspace):
     sign = "openssl x509 -req -copy_extensions copy -CA authority.pem -CAkey authority.key"
     named = "openssl req -new -key server.key -subj /CN=localhost -addext subjectAltName=DNS:"
     workspace.shell(" && ".join([
-        *commands, "cp server.key other.key", "cp server.key late.key", "cp server.key foreign.key",
+        *commands, "for name in other late foreign stranger; do cp server.key $name.key; done",
         f"{named}elsewhere -out other.csr", f"{sign} -in other.csr -out other.pem -days 365",
         f"{named}localhost -out late.csr", f"{sign} -in late.csr -out late.pem -days -1",
-        f"{named}localhost -x509 -out foreign.pem"]))
+        f"{named}localhost -x509 -out foreign.pem",
+        f"{sign} -in server.csr -out stranger.pem -CA foreign.pem -CAkey foreign.key"]))
 
 
 def test_sockets(binary):
