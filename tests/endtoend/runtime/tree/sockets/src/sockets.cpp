@@ -1,5 +1,6 @@
 // All transports, and what is of one of them. Prints what went wrong, and the number of transports.
 @import "sockets/sockets.h"
+@import "sockets/attacks.h"
 @import "Vesk/vxObject/LocalSocketChannel.h"
 
 #include <malloc.h>
@@ -114,7 +115,7 @@ int ModeOf(const char* path) {
 void CheckMode() {
     const mode_t mask = umask(0);
     std::atomic<bool> isDone = false;
-    int seen = 0, others = 0;
+    std::atomic<int> seen = 0, others = 0;
     std::thread looking([&] {
         while (!isDone) {
             const int mode = ModeOf("mode.socket");
@@ -122,11 +123,13 @@ void CheckMode() {
             others += mode != 0600 && mode != -1;
         }
     });
-    for (int i = 0; i < 500; ++i) vesk::LocalSocketServer("mode.socket", NoObjects());
+    const auto end = Clock::now() + Time(20000);
+    for (int i = 0; i < 500 || (seen < 20 && Clock::now() < end); ++i) vesk::LocalSocketServer("mode.socket", NoObjects());
     isDone = true;
     looking.join();
     umask(mask);
-    CHECK(seen > 0 && others == 0);
+    CHECK(seen > 0);
+    CHECK(others == 0);
     CHECK(ModeOf("mode.socket") == -1 && ModeOf("mode.socket.lock") == -1);
 }
 

@@ -1,5 +1,5 @@
 // TLS, and what is of it alone: certificates that are not taken, and other sides that speak something else.
-@import "sockets/sockets.h"
+@import "sockets/attacks.h"
 @import "Vesk/vxObject/TlsChannel.h"
 
 namespace {
