@@ -1,7 +1,7 @@
 // The messages of remote calls. The first byte of an input says whose they are: those of a client, which a server reads
 // one after the other, or the answers that a client gets to a call. Each message is a length in one byte and its bytes.
-// A server comes through whatever it is sent and answers the call behind it; a client's call ends with its values or an
-// error, and no later answer finds what it waited with.
+// A server comes through whatever it is sent and answers the call behind it, and where it asks for a token, it calls
+// nothing before; a client's call ends with its values or an error, and no later answer finds what it waited with.
 
 #include "kinds/remote.h"
 #include "seeds.h"
@@ -26,7 +26,8 @@ void Require(bool holds) {
   if (!holds) std::abort();
 }
 
-void ServeMessages(Input input) {
+void ServeMessages(Input input, bool asksForToken) {
+  const vesk::xstring token = "of sixteen bytes or more";
   kinds::Calc calc;
   calc.onSwap = [](vesk::string8& text) {
     if (text.size() > 3) throw std::runtime_error(text);
@@ -34,12 +35,17 @@ void ServeMessages(Input input) {
   vesk::LocalChannel channel;
   vesk::Server server(channel.Server());
   server.SetMessageLimit(1000);
+  bool isCalled = false;
+  server.Authorize([&](vesk::xstring, vesk::xstring, vesk::Peer const&) { return isCalled = true; });
+  if (asksForToken) server.AddToken(token);
   const vesk::uint32 number = server.Export(vesk::ptr<kinds::ICalc>(&calc));
   for (Bytes message; input.Next(message);) channel.Client().Send(message);
   server.Serve();
   for (Bytes answer; channel.Client().Receive(answer);) {
   }
+  Require(!asksForToken || !isCalled);
   vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
+  if (asksForToken) client.GiveToken(token);
   const auto stub = vesk::Import<kinds::ICalc>(client, number);
   vesk::int32 sum = 0;
   vesk::ptr<kinds::ICalc>(stub->Interface())->Add(3, "four", sum);
@@ -105,7 +111,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
   if (size == 0) return 0;
   const Input input{data + 1, data + size};
   if (data[0] % 2 == 0) {
-    ServeMessages(input);
+    ServeMessages(input, data[0] % 4 == 2);
   } else {
     TakeAnswers(input);
   }
