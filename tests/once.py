@@ -16,7 +16,7 @@ ROOT = Path(__file__).resolve().parent.parent
 READ = ("CHANGELOG.md", "CMakeLists.txt", "HACKING.md", "README.md", "cmake", "docs", "examples", "runtime", "src", "templates",
         "tests/endtoend", "tests/faults", "tests/generators", "tests/once.py")
 TOOLS = ("g++", "gcc", "cc", "ld", "ar", "make", "clang", "clang++", "lld-link", "llvm-lib", "setarch", "unshare", "python3",
-         "cmake", "ninja", "meson", "cpack", "lintian", "man", "bash", "zsh", "chromium", "gdb", "ccache", "distcc", "icecc", "sccache")
+         "cmake", "ninja", "meson", "cpack", "lintian", "man", "bash", "zsh", "chromium", "gdb", "openssl", "ccache", "distcc", "icecc", "sccache")
 SKIPPED = 77
 
 

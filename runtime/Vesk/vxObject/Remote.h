@@ -80,7 +80,8 @@ class ClientConnection {
   // Sends a call and waits for its answer, whose values `response` takes. Whatever way the call ends, no later answer
   // finds the response.
   void Call(Archive const& message, uint32 answer, PendingResponse& response);
-  // What Server::AddToken asks for. RemoteError when it is not a token of the server, which then ends the connection.
+  // What Server::AddToken asks for. RemoteError when it is not a token of the server, which then ends the connection,
+  // and when that asks for none.
   void GiveToken(xstring const& token);
 
  private:
