@@ -169,6 +169,22 @@ void CheckSilent() {
     CHECK(host.server->Clients() == 1);
 }
 
+// Who leaves says so: it does not look cut off.
+void CheckFarewell() {
+    const auto io = std::make_shared<boost::asio::io_context>();
+    Tcp::acceptor acceptor(*io, OverTls::AnyPlace());
+    std::thread leaving([&] { OverTls::ConnectTo(acceptor.local_endpoint()); });
+    auto context = OverTls::LiarContext();
+    auto stream = OverTls::Transport::Make(acceptor.accept(), context);
+    OverTls::Accept(stream);
+    vesk::StreamChannel<OverTls::Transport> channel(io, std::move(stream), false);
+    channel.Send({});
+    Bytes message;
+    CHECK(!channel.ReceiveWithin(message, Time(5000)));
+    CHECK(channel.HasEnded() && channel.Failure().empty());
+    leaving.join();
+}
+
 // Who has a token needs no certificate.
 void CheckToken() {
     g_files = {"server.pem", "server.key", ""};
@@ -189,4 +205,5 @@ static const bool s_isThere = (g_rows.push_back([] {
     CheckOthers();
     CheckToken();
     CheckSilent();
+    CheckFarewell();
 }), true);
