@@ -51,9 +51,13 @@ void Server::AskAt(const std::string& method, const Json& params, const Place& p
 
 void Server::Hover(const Json& params, Reply reply) {
   const auto place = PlaceOf(params);
-  if (!place || !place->file) return reply(nullptr);
-  const std::string own = m_own->Hover(*place->file, place->offset);
+  if (!place) return reply(nullptr);
+  const bool isProject = IsProjectText(*place->document);
+  if (!isProject && !place->file) return reply(nullptr);
+  const std::string own = isProject ? HoverInProject(place->document->path, place->document->text.Text(), place->offset)
+                                    : m_own->Hover(*place->file, place->offset);
   if (!own.empty()) return reply({{"contents", {{"kind", "markdown"}, {"value", own}}}});
+  if (isProject) return reply(nullptr);
   AskAt("textDocument/hover", params, *place, [this, file = place->file, reply](const Json& answer) {
     reply(answer.is_object() ? m_mapping->WithRanges(*file, answer) : Json(nullptr));
   });

@@ -87,6 +87,16 @@ Json CompletionInProject(const std::string& path, std::string_view text, size_t 
   return items;
 }
 
+std::string HoverInProject(const std::string& path, std::string_view text, size_t offset) {
+  const WordPlace place = WordAt(text, offset);
+  const std::string word(text.substr(place.begin, place.end - place.begin));
+  for (const Json& item : CompletionInProject(path, "", 0)) {
+    const std::string help = TextAt(item, "detail");
+    if (TextAt(item, "label") == word && !help.empty()) return "`" + word + "`: " + help;
+  }
+  return {};
+}
+
 // --- Colours
 
 std::vector<std::string> TokenTypes() { return {"macro", "keyword", "variable"}; }

@@ -136,6 +136,7 @@ def test_own_language(client):
     client.open("all.qrex")
     words = {i["label"] for i in client.ask("textDocument/completion", client.place("all.qrex", "virtualTree", 3))}
     assert {"virtualTree", "lineDirectives"} <= words
+    holds(client.ask("textDocument/hover", client.place("all.qrex", "virtualTree"))["contents"]["value"], "`virtualTree`: ")
     tokens = client.ask("textDocument/semanticTokens/full", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})["data"]
     equal(tokens[:10], [0, 0, 7, 0, 0, 1, 0, 4, 0, 0])  # @import, @def
     folds = client.ask("textDocument/foldingRange", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})
