@@ -3,10 +3,10 @@
 #include <algorithm>
 #include <map>
 #include <random>
-#include <thread>
 #include <vector>
 
 #include "platform/file_system.h"
+#include "platform/system.h"
 #include "text/source_texts.h"
 #include "text/stream_adapters.h"
 #include "translator/file/translate_file.h"
@@ -159,12 +159,15 @@ class TranslateAgainTest : public WorldTest {
   }
 
   enum class Way { Living, RunAfterRun };
+  void StartRun() {
+    settings.begun = platform::SystemFileTime();
+    StartBuild();
+  }
   // A run, now and then after one of a single file, or with an output that is gone.
   std::string ErrorOfRun() {
-    std::this_thread::sleep_for(std::chrono::milliseconds(10));  // what is translated now is younger than its source
     if (Chance(15)) {
       settings.mode = RunMode::Compile;
-      StartBuild();
+      StartRun();
       ErrorOf([&] {
         builder->Build("app.qrexdep", workspace->FindFile("app/src/" + Names()[kHeaders + Below(kSources)]));
       });
@@ -173,7 +176,7 @@ class TranslateAgainTest : public WorldTest {
     if (const auto outputs = Outputs(); Chance(15) && !outputs.empty()) {
       std::filesystem::remove(std::next(outputs.begin(), static_cast<ptrdiff_t>(Below(outputs.size())))->first);
     }
-    StartBuild();
+    StartRun();
     return ErrorOf([&] { builder->Build("app.qrexdep", nullptr); });
   }
   std::vector<int64_t> Times() const {
@@ -206,7 +209,7 @@ class TranslateAgainTest : public WorldTest {
       }
       if (freshError.empty() && way == Way::RunAfterRun) {
         const std::vector<int64_t> times = Times();
-        StartBuild();
+        StartRun();
         builder->Build("app.qrexdep", nullptr);
         EXPECT_EQ(times, Times()) << "nothing was left to do";
       }
