@@ -51,7 +51,7 @@ class TranslateAgainTest : public WorldTest {
   void Lay(const std::string& path, const std::string& text) {
     m_texts.Lay(path, text);
     Write(path, text);
-    std::filesystem::last_write_time(path, std::filesystem::file_time_type::clock::now());
+    platform::SetWriteTime(path, platform::SystemFileTime());  // what libraries set may be in whole seconds
   }
 
   size_t Below(size_t end) { return m_random() % end; }
