@@ -7,6 +7,7 @@
 
 #include "platform/file_system.h"
 #include "platform/system.h"
+#include "text/output_policy.h"
 #include "text/source_texts.h"
 #include "text/stream_adapters.h"
 #include "translator/file/translate_file.h"
@@ -174,7 +175,7 @@ class TranslateAgainTest : public WorldTest {
       settings.mode = RunMode::Build;
     }
     if (const auto outputs = Outputs(); Chance(15) && !outputs.empty()) {
-      std::filesystem::remove(std::next(outputs.begin(), static_cast<ptrdiff_t>(Below(outputs.size())))->first);
+      DeleteThoughReadOnly(std::next(outputs.begin(), static_cast<ptrdiff_t>(Below(outputs.size())))->first);
     }
     StartRun();
     return ErrorOf([&] { builder->Build("app.qrexdep", nullptr); });
