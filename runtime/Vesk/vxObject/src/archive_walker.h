@@ -88,7 +88,8 @@ class ArchiveWalker {
   void WalkVariant(ValueType const& type, Step step);
   void WalkOpenVariant(ValueType const& type, Step step);
   void WalkReference(ValueType const& type, Step step);
-  ValueType const* WalkClassName();
+  ValueType const* WalkClassName(Step step);
+  void AddName(EArchiveName what, Step step = Step());
   void AddRelease(XTarget const* target);  // null: not of this program
   void WalkBytes(TypeOps const& ops);
   xstring TakeText();

@@ -12,12 +12,16 @@ ArchiveWalker::Layout const& ArchiveWalker::LayoutOf(ReflectedClass const& recor
   return at->second;
 }
 
+ReflectedClass const* ModelOf(ReflectedClass const& record) {
+  if (record.m_flags & CF_REFERENCES_MODEL) {
+    return Find<ReflectedClass>(record.m_modelFields[record.m_numModelFields - 1].m_name);
+  }
+  return record.m_flags & (CF_MODEL | CF_HAS_MODEL) ? &record : nullptr;
+}
+
 // The fields stand in the order in which they are archived, those that were dropped included.
 void ArchiveWalker::FillLayout(Layout& layout, ReflectedClass const& record) {
-  ReflectedClass const* model = record.m_flags & (CF_MODEL | CF_HAS_MODEL) ? &record : nullptr;
-  if (record.m_flags & CF_REFERENCES_MODEL) {
-    model = Find<ReflectedClass>(record.m_modelFields[record.m_numModelFields - 1].m_name);
-  }
+  ReflectedClass const* const model = ModelOf(record);
   layout.m_target = TargetOf(record);
   layout.m_modelTarget = model ? TargetOf(*model) : nullptr;
   if (!layout.m_target || !layout.m_modelTarget) return;

@@ -216,7 +216,7 @@ void ArchiveWalker::WalkEntries(ValueType const& type, std::size_t count) {
     const uint32 number = static_cast<uint32>(i);
     if (type.m_key) {
       const Group entry(*this, nullptr, {EPathStep::Entry, nullptr, number});
-      Walk(*type.m_key, Step());
+      Walk(*type.m_key, {EPathStep::Key, nullptr, 0});
       Walk(*type.m_item, Step());
     } else {
       Walk(*type.m_item, {EPathStep::Element, nullptr, number});
@@ -251,7 +251,7 @@ void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
   const Group group(*this, &type, step);
   const std::size_t begin = m_archive.m_position;
   const xstring name = TakeText();
-  AddLeaf(AP_NAME);
+  AddName(AN_TYPE);
   m_archive.m_position = begin;
   TypeOps const* const ops = AnyValue::ReadType(m_archive);
   if (!ops) return;
@@ -274,7 +274,7 @@ void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
   if (known >= m_archive.m_limits.m_objects) FailArchive("too many objects in an archive");
   ReflectedClass const* const target = type.m_code == RC_CREF ? Find<ReflectedClass>(type.m_target) : nullptr;
   if (type.m_code == RC_PREF || (target && target->m_objectTable)) {
-    objects.push_back({WalkClassName(), kNoNode, false});
+    objects.push_back({WalkClassName(step), kNoNode, false});
   } else {
     objects.push_back({target ? &m_content.m_types.Of(*target) : nullptr, kNoNode, false});
   }
@@ -286,9 +286,13 @@ void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
   }
 }
 
-ValueType const* ArchiveWalker::WalkClassName() {
+void ArchiveWalker::AddName(EArchiveName what, Step step) {
+  if (ArchiveNode* node = AddLeaf(AP_NAME, nullptr, step)) node->m_detail = what;
+}
+
+ValueType const* ArchiveWalker::WalkClassName(Step step) {
   const xstring name = TakeText();
-  AddLeaf(AP_NAME);
+  AddName(AN_CLASS, step);
   ReflectedClass const* const record = Find<ReflectedClass>(name);
   if (!record) throw ArchiveError(NotRegistered("class", name));
   auto const& allow = m_archive.m_objects.m_allow;
@@ -359,10 +363,10 @@ void ArchiveWalker::Head() {
 void ArchiveWalker::HeadReleases(bool occurs) {
   const xvector<XTarget const*> targets = AllTargets();
   std::size_t count = ReadCount(m_archive, 2);
-  AddLeaf(AP_COUNT, nullptr, {EPathStep::None, occurs ? "projects whose models occur" : "other projects", 0});
+  AddLeaf(AP_COUNT, nullptr, {EPathStep::None, occurs ? "whose models occur" : "others", 0});
   for (; count > 0; --count) {
     const xstring name = TakeText();
-    AddLeaf(AP_NAME);
+    AddName(AN_PROJECT);
     const RSN release = ReadCompact(m_archive);
     const auto target =
         std::find_if(targets.begin(), targets.end(), [&name](XTarget const* t) { return name == t->m_name; });
