@@ -147,7 +147,7 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
     case AP_VALUE:
       return ArchiveValueText(content, *node.m_type, bytes);
     case AP_BYTES:
-      return vxMakeString(node.m_size << " bytes, read by code of their own");
+      return vxMakeString(node.m_size << " bytes that only the class knows");
     case AP_REST:
       return vxMakeString(node.m_size << " bytes" << (content.m_error.empty() ? ", more than is shown" : ", not read"));
     case AP_GROUP:
@@ -163,6 +163,11 @@ xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node) {
   }
   ArchiveNode const* const first = node + 1 < of.m_end ? &content.m_nodes[node + 1] : nullptr;
   if (first && first->m_kind == AP_COUNT) return ArchiveNodeText(content, *first) + " elements";
+  if (first && (first->m_kind == AP_TAG || first->m_kind == AP_NAME)) {
+    xstring held;
+    if (node + 2 < of.m_end) held = ' ' + ArchiveShortText(content, node + 2);
+    return (first->m_kind == AP_TAG ? xstring(first->m_label) : ArchiveNodeText(content, *first)) + held;
+  }
   return of.m_type ? of.m_type->m_text : xstring();
 }
 

@@ -139,34 +139,19 @@ xstring ArchiveWalker::TakeText() {
 void ArchiveWalker::WalkClass(ValueType const& type, Step step) {
   const ReadingScope scope(m_archive);
   if (StackLeft() < kLeastStack) FailArchive("values nested too deeply in an archive");
-  if (!m_isChecked || m_checkable == 0) return WalkUnchecked(type, step);
-  const Mark mark = Here();
-  std::size_t end = 0;
-  try {
-    end = Probe(*type.m_ops, false);
-  } catch (std::exception const&) {
-  }
-  GoBack(mark);
-  if (end == 0) return WalkUnchecked(type, step);
-  m_checkable -= std::min(m_checkable, end - mark.m_position);
-  try {
-    WalkUnchecked(type, step);
-    if (m_archive.m_position == end) return;
-  } catch (ArchiveError const&) {
-  }
-  GoBack(mark);
-  const Group group(*this, &type, step);
-  WalkBytes(*type.m_ops);
+  WalkOpened(type, step);
 }
 
-void ArchiveWalker::WalkUnchecked(ValueType const& type, Step step) {
+void ArchiveWalker::WalkOpened(ValueType const& type, Step step) {
   const Group group(*this, &type, step);
   Layout const& layout = LayoutOf(*type.m_class);
-  if (!layout.m_isKnown) return WalkBytes(*type.m_ops);
-  WalkFields(layout);
+  if (!layout.m_isKnown) return WalkBytes(ProbeClass(*type.m_class), m_content.m_objects.size());
+  WalkFields(layout, layout.m_isOpen ? ProbeClass(*type.m_class) : Extent());
 }
 
-void ArchiveWalker::WalkFields(Layout const& layout) {
+// What stands behind a field without a record is not known: it takes up the rest of the extent.
+void ArchiveWalker::WalkFields(Layout const& layout, Extent const& extent) {
+  const std::size_t firstMentioned = m_content.m_objects.size();
   if (layout.m_hasRelease) {
     const std::size_t position = m_archive.m_position;
     ReadCompact(m_archive);
@@ -176,7 +161,10 @@ void ArchiveWalker::WalkFields(Layout const& layout) {
   }
   const RSN release = layout.m_asksRelease ? ReleaseBeingRead(*layout.m_modelTarget) : layout.m_first;
   for (auto const& [field, type] : layout.m_fields) {
-    if (layout.IsIn(*field, release)) Walk(*type, {EPathStep::Field, field->m_name, 0});
+    if (!layout.IsIn(*field, release)) continue;
+    const Step step = {EPathStep::Field, field->m_name, 0};
+    if (type->m_kind == VK_NONE) return WalkBytes(extent, firstMentioned, step);
+    Walk(*type, step);
   }
 }
 
@@ -185,9 +173,17 @@ void ArchiveWalker::AddRelease(XTarget const* target) {
   if (node) node->m_detail = target ? static_cast<uint32>(target->m_rsn) : kNoNode;
 }
 
-void ArchiveWalker::WalkBytes(TypeOps const& ops) {
-  Probe(ops, true);
-  AddLeaf(AP_BYTES);
+// To the end of an extent, some of whose objects may have been walked.
+void ArchiveWalker::WalkBytes(Extent const& extent, std::size_t firstMentioned, Step step) {
+  auto& objects = m_content.m_objects;
+  if (m_archive.m_position > extent.m_end || objects.size() - firstMentioned > extent.m_mentioned.size()) {
+    FailArchive("not laid out as its record tells");
+  }
+  m_archive.m_position = extent.m_end;
+  m_archive.m_releases = extent.m_releases;
+  if (m_covered < extent.m_end) AddLeaf(AP_BYTES, nullptr, step);
+  const std::size_t walked = objects.size() - firstMentioned;
+  objects.insert(objects.end(), extent.m_mentioned.begin() + walked, extent.m_mentioned.end());
 }
 
 // --- Containers
@@ -242,7 +238,7 @@ void ArchiveWalker::WalkVariant(ValueType const& type, Step step) {
   if (item && item->m_code == RC_VOID) return;
   if (item && item->m_kind != VK_NONE) return Walk(*item, {EPathStep::Field, name, 0});
   m_archive.m_position = begin;
-  WalkBytes(*type.m_ops);
+  WalkBytes(ProbeValue(*type.m_ops), m_content.m_objects.size());
 }
 
 void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
@@ -256,7 +252,11 @@ void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
   TypeOps const* const ops = AnyValue::ReadType(m_archive);
   if (!ops) return;
   if (ValueType const* held = JsonTypeOfName(m_content.m_types, name)) return Walk(*held, Step());
-  WalkBytes(*ops);
+  const std::size_t position = m_archive.m_position;
+  m_archive.m_position = begin;
+  const Extent extent = ProbeValue(GetTypeOps<openvariant<int32>>());
+  m_archive.m_position = position;
+  WalkBytes(extent, m_content.m_objects.size());
 }
 
 // --- References
@@ -308,7 +308,8 @@ void ArchiveWalker::WalkContent(std::size_t object) {
   const Step step = {EPathStep::Object, nullptr, static_cast<uint32>(object + 1)};
   m_content.m_objects[object].m_node = static_cast<uint32>(m_content.m_nodes.size());
   if (!type) throw ArchiveError("what stands there is not known");
-  if (type->m_class->m_objectTable) return WalkUnchecked(*type, step);
+  const ArchiveScope scope(m_archive);
+  if (type->m_class->m_objectTable) return WalkOpened(*type, step);
   WalkClass(*type, step);
 }
 
@@ -317,27 +318,16 @@ void ArchiveWalker::WalkContent(std::size_t object) {
 // The walk has to end where that ended which was read ahead; if it cannot, the bytes are shown as they are.
 template <typename Action>
 void ArchiveWalker::WalkAsRead(ValueType const* type, Step step, Action walk) {
-  const std::size_t end = m_end;
-  const ReleaseList releases = m_releasesAtEnd;
+  const Extent extent = {m_end, ObjectsFrom(m_content.m_objects.size()), m_releasesAtEnd};
   const Mark mark = Here();
-  m_checkable = 8 * m_archive.m_bytes.size() + 4096;
-  for (bool isChecked : {false, true}) {
-    m_isChecked = isChecked;
-    try {
-      walk();
-      if (m_archive.m_position == end) break;
-    } catch (ArchiveError const&) {
-    }
-    GoBack(mark);
+  try {
+    walk();
+    if (m_archive.m_position == extent.m_end) return;
+  } catch (ArchiveError const&) {
   }
-  m_isChecked = false;
-  if (m_archive.m_position != end) {
-    const Group group(*this, type, step);
-    m_archive.m_position = end;
-    AddLeaf(AP_BYTES);
-    NoteMentioned(mark.m_objects);
-  }
-  m_archive.m_releases = releases;
+  GoBack(mark);
+  const Group group(*this, type, step);
+  WalkBytes(extent, mark.m_objects);
 }
 
 void ArchiveWalker::Head() {
@@ -378,6 +368,7 @@ void ArchiveWalker::HeadReleases(bool occurs) {
 
 void ArchiveWalker::Objects() {
   try {
+    if (!m_content.m_error.empty()) return Finish();
     Head();
     m_isInReference = m_archive.m_objects.m_isReading = true;
     ReadRoot();
@@ -404,6 +395,7 @@ void ArchiveWalker::Value() {
   ValueType const& type = *m_content.m_type;
   TypeOps const& ops = *m_content.m_ops;
   try {
+    if (!m_content.m_error.empty()) return Finish();
     ReadAhead([this, &ops] {
       auto scratch = std::make_unique<Scratch>(ops);
       m_content.m_value = scratch->m_value;
