@@ -49,7 +49,7 @@ struct GraphState::Rest {
 // A calculation, while it lives. Does nothing without a watch.
 struct GraphState::Timing {
   Timing(GraphState& state, DGNode const& node) : m_state(state), m_node(node) {
-    if (state.m_rest && state.m_rest->m_watched) Begin();
+    if (state.m_isWatched) Begin();
   }
   ~Timing() {
     if (m_watched) End();
