@@ -30,11 +30,7 @@ struct WatchedNodes {
 };
 
 struct GraphState::Rest {
-  void OnDestroy(DGNode const& node) {
-    m_again.erase(&node);
-    m_failed.erase(&node);
-    if (m_watched) m_watched->OnDestroy(node);
-  }
+  void OnDestroy(DGNode const& node);
   void RethrowErrorOf(DGNode const& node) const {
     if (m_failed.empty()) return;
     const auto failed = m_failed.find(&node);

@@ -3,6 +3,7 @@
 
 @import "Vesk/vxObject/GraphView.h"
 @import "Vesk/vxObject/ValueTypes.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <cstdlib>
 #include <cstring>
@@ -232,8 +233,11 @@ class Viewer {
     node.m_name = LimitText(name, m_limits.m_text);
     if (!record) return;
     node.m_class = record->m_name;
-    const Value value = Value(*record, const_cast<void*>(node.m_owner)).Find(name);
-    if (!name.empty() && IsShort(value.Kind())) node.m_value = LimitText(value.Text(), m_limits.m_text);
+    try {
+      const Value value = Value(*record, const_cast<void*>(node.m_owner)).Find(name);
+      if (!name.empty() && IsShort(value.Kind())) node.m_value = LimitText(value.Text(), m_limits.m_text);
+    } catch (AccessError const&) {  // in a container that cannot be walked
+    }
   }
 
   GraphLimits const& m_limits;

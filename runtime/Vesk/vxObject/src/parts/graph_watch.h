@@ -4,6 +4,12 @@
 
 namespace vesk {
 
+void GraphState::Rest::OnDestroy(DGNode const& node) {
+  m_again.erase(&node);
+  m_failed.erase(&node);
+  if (m_watched) m_watched->OnDestroy(node);
+}
+
 // --- Counts and times
 
 void GraphState::Timing::Begin() {

@@ -161,7 +161,7 @@ ROW(DumpedErrors) {
     CHECK(Brief<Size>(Bytes(size.begin(), size.end() - 3)), "width=20 =3 bytes, not read read beyond the end of an archive");
     CHECK(Brief<Size>(Joined(Bytes(size.begin(), size.end() - 2), {4, 0})),
           numbers + "=2 bytes, not read number without a label in an enumeration");
-    CHECK(Brief<Size>(Joined(size, {3})), numbers + "colour=Red level=Mid =1 bytes, not read bytes behind the value");
+    CHECK(Brief<Size>(Joined(size, {3})), numbers + "colour=Red level=Mid =1 byte, not read bytes behind the value");
     CHECK(Brief<vesk::xvector<bool>>({2, 1, 2}), "=2 =2 bytes, not read not a bool");
     CHECK(Brief<vesk::xvector<Size>>({0xF0, 0xFF, 0xFF, 0xFF, 0xFF}),
           "=4294967295 read beyond the end of an archive");
@@ -207,6 +207,9 @@ ROW(ArchiveDifferences) {
     typedef vesk::xmap<vesk::string8, Size> Sizes;
     CHECK(Difference(Sizes{{"a", Size(1)}, {"b", Size(2)}}, Sizes{{"b", Size(3)}, {"c", Size(4)}}),
           "-[a] kinds::Size|; [b].width 2|3; [b].height 2|3; +[c] |kinds::Size; ");
+    const vesk::ArchiveView none(vesk::WriteObject(vesk::ptr<IDoc>()));
+    CHECK(none.Error(), "");
+    CHECK(ChangesText(vesk::CompareArchives(none, vesk::ArchiveView(g_oldOfKinds))), " |OfKinds; ");
     CHECK(Difference(Value(int32(3)), Value(vesk::string8("3"))), " int32 3|string8 \"3\"; ");
 
     // An object is the one that the same reference leads to, whatever its number is.
