@@ -103,7 +103,10 @@ void GraphState::LookAtInputs(DGNode const& outermost) {
 }
 
 inline void GraphState::Calculate(DGNode const& node) {
-  if (node.m_isCalculating || node.m_unwound || m_rest) CheckCalculation(node);
+  if (node.m_isCalculating || node.m_unwound || m_rest) {
+    CheckCalculation(node);
+    if (m_isWatched) return CalculateTimed(node);
+  }
   if (IsDeep()) return CalculateElsewhere(node);
   CalculateHere(node);
 }
@@ -111,6 +114,11 @@ void GraphState::CheckCalculation(DGNode const& node) const {
   if (node.m_isCalculating) throw GraphError("cyclic dependency: " + node.Name());
   if (m_rest) m_rest->RethrowErrorOf(node);
   if (IsWaiting(node)) throw GraphError("cyclic dependency: " + node.Name());
+}
+void GraphState::CalculateTimed(DGNode const& node) {
+  Timing timing(*this, node);
+  IsDeep() ? CalculateElsewhere(node) : CalculateHere(node);
+  timing.Succeed();
 }
 
 void GraphState::CalculateHere(DGNode const& node) {
@@ -169,7 +177,7 @@ void GraphState::EndOfRest() {
     m_rest->m_again.erase(m_rest->m_again.begin());
     Invalidate(*node, hard);
   }
-  delete std::exchange(m_rest, nullptr);
+  if (!m_isWatched) delete std::exchange(m_rest, nullptr);
 }
 
 // --- The calculation that runs
@@ -286,9 +294,11 @@ ssize_t AsyncQueues::Run(EQueue queue) {
     DGAsyncNode const& node = *static_cast<DGAsyncNode const*>(static_cast<DGWaitPlace const*>(waiting.First()));
     Leave(node);
     Calculation detached(GraphState::Get(), nullptr);
+    GraphState::Timing timing(GraphState::Get(), node);
     bool isChanged;
     try {
       isChanged = node.CalculateOutput();
+      timing.Succeed();
     } catch (...) {
       GraphState::Get().Invalidate(node, true);
       throw;
