@@ -97,7 +97,7 @@ def runtime_program(name, output, keys):
 
 # The programs of the tests of the runtime: what they are to print, and the keys that they are translated with.
 RUNTIME = {
-    "all": (r"(?s) [1-9]\d\d checks, 0 failures\n.*last\n", ""),
+    "all": (r"(?s)^[1-9]\d\d checks, 0 failures\n.*last\n", ""),
     "compilable": (r" checks, 0 failures\n", "compilableText = true modernCpp = true"),
     "memory": (r" runs, 0 failures\n", "compilableText = true"),
     "order": (r"(?s)^\[254\]\n\[1\]\n\[2,1\]\n\[4,3,2,1\]\n.*\nnested\[k\]\[300\]\n$", ""),
@@ -122,5 +122,6 @@ def examples():
 
 def runtime():
     count = counted("the runtime, compiled for Windows", [(name, lambda name=name: runtime_program(name, *RUNTIME[name])) for name in RUNTIME])
+    count.skip("sockets", "its attacks need limits of descriptors, forks and Unix sockets; examples/remote calls over Winsock")
     count.skip("twice", "plug-ins there share nothing that is not exported")
     return count
