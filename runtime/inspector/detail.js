@@ -93,11 +93,11 @@ const detail = {
     if (node !== this.node) return;
     route.remember();
     const method = this.openMethod();
-    this.element.replaceChildren(
+    this.element.replaceChildren(...[
       make('p', { className: 'path mono' }, pathText(node.path)),
       make('h2', {}, look.name),
       look.help && make('p', { className: 'note' }, look.help),
-      this.facts(look), this.value(look), this.listTools(look), this.elementTools(node), ...this.methods(look));
+      this.facts(look), this.value(look), this.listTools(look), this.elementTools(node), ...this.methods(look)].filter(Boolean));
     if (method) this.restore(method);
   },
 

@@ -46,7 +46,7 @@ const route = {
 const search = {
   timer: 0, list: null,
   start(panel) {
-    this.list = panel.insertBefore(make('ul', { className: 'list', hidden: true, 'aria-label': 'Found' }), panel.firstChild);
+    this.list = panel.insertBefore(make('ul', { className: 'names', hidden: true, 'aria-label': 'Found' }), panel.firstChild);
     this.note = make('li', { className: 'note', role: 'status' });
     byId('search').addEventListener('input', () => {
       clearTimeout(this.timer);
@@ -141,8 +141,8 @@ function start() {
   const side = make('aside', { className: 'side', 'aria-label': 'Selected value' });
   addView('objects', 'Objects', left, side).classList.add('split');
   const typeSide = make('div', { className: 'side' });
-  const typeList = make('ul', { className: 'list', 'aria-label': 'Types' });
-  addView('types', 'Types', typeList, typeSide).classList.add('split');
+  const typeList = make('ul', { className: 'names', 'aria-label': 'Types' });
+  addView('types', 'Types', typeList, typeSide).classList.add('split', 'types');
   changes.start(addView('changes', 'Changes'));
   search.start(left);
   tree.start(treeElement);

@@ -49,8 +49,32 @@ class TreeNode {
   index() { return this.parent.parent ? this.parent.index() + 1 + this.parent.indexOf(this.position) : this.parent.indexOf(this.position); }
 }
 
+// The element of a row, whose parts change only where they must.
+class RowView {
+  constructor(index) {
+    this.index = index;
+    this.parts = {};
+    this.element = make('div', { role: 'treeitem', id: `row${index}`, 'data-index': index });
+    for (const name of ['twist', 'name', 'swatch', 'text', 'unit', 'stale', 'type']) {
+      this.parts[name] = this.element.appendChild(make('span', { className: name }));
+    }
+    this.parts.twist.setAttribute('aria-hidden', 'true');
+    this.parts.stale.title = 'An input has changed since it was calculated';
+  }
+  set(name, value) {
+    if (value === undefined) this.element.removeAttribute(name);
+    else if (this.element.getAttribute(name) !== String(value)) this.element.setAttribute(name, value);
+  }
+  write(texts) {
+    for (const [name, text] of Object.entries(texts)) {
+      if (this.parts[name].textContent !== text) this.parts[name].textContent = text;
+      if (name === 'unit' || name === 'stale') this.parts[name].hidden = !text;
+    }
+  }
+}
+
 const tree = {
-  root: null, nodes: new Map(), first: 0, selected: null, watched: '', element: null, space: null, isDrawn: true,
+  root: null, nodes: new Map(), first: 0, selected: null, watched: '', element: null, space: null, isDrawn: true, views: new Map(),
 
   start(element) {
     this.element = element;
@@ -241,7 +265,11 @@ const tree = {
     const places = [];
     this.root.collect(this.first, this.rows(), places);
     const top = this.element.scrollTop - (this.offset || 0);
-    this.space.replaceChildren(...places.map((place, i) => this.rowElement(place, this.first + i, top + i * kRow)));
+    const views = places.map((place, i) => this.rowElement(place, this.first + i, top + i * kRow));
+    const kept = new Map(views.map(view => [view.index, view]));
+    for (const [index, view] of this.views) kept.has(index) || view.element.remove();
+    views.forEach(({ element }, i) => this.space.children[i] === element || this.space.insertBefore(element, this.space.children[i] || null));
+    this.views = kept;
     const shown = this.selected && this.space.querySelector('[aria-selected="true"]');
     if (shown) this.element.setAttribute('aria-activedescendant', shown.id);
     else this.element.removeAttribute('aria-activedescendant');
@@ -252,27 +280,26 @@ const tree = {
       this.select(parent.kids.get(position));
     }
   },
+  // The element of a row stays while the row is on the screen: it may be under a finger.
   rowElement({ parent, position }, index, top) {
     const node = parent.kids.get(position);
     const row = node ? node.row : { name: '…', kind: 'none', text: '' };
-    const flash = node && node.changed && performance.now() - node.changed < 1000;
-    const mark = !row.count ? '' : node.open ? '▾' : '▸';
-    const element = make('div', {
-      className: `row ${row.kind}${row.bad ? ' bad' : ''}${flash ? ' flash' : ''}`, role: 'treeitem', id: `row${index}`, 'data-index': index,
-      'aria-level': parent.level() + 1, 'aria-setsize': parent.count, 'aria-posinset': position + 1,
-      'aria-expanded': row.count ? String(node.open) : undefined, 'aria-selected': String(!!node && node === this.selected),
-    },
-    make('span', { className: 'twist', 'aria-hidden': 'true' }, mark),
-    make('span', { className: 'name' }, row.name),
-    row.color && swatch(row.text),
-    make('span', { className: 'text' }, rowText(row)),
-    row.unit && make('span', { className: 'unit' }, row.unit),
-    row.fresh === false && make('span', { className: 'stale', title: 'An input has changed since it was calculated' }, 'stale'),
-    make('span', { className: 'type' }, row.type || ''));
-    element.style.top = `${top}px`;
-    element.style.paddingLeft = `${4 + 16 * parent.level()}px`;
+    const flash = !!node && performance.now() - node.changed < 1000;
+    const view = this.views.get(index) || new RowView(index);
+    view.element.className = `row ${row.kind}${row.bad ? ' bad' : ''}${flash ? ' flash' : ''}`;
+    view.element.style.top = `${top}px`;
+    view.element.style.paddingLeft = `${4 + 16 * parent.level()}px`;
+    view.set('aria-level', parent.level() + 1);
+    view.set('aria-setsize', parent.count);
+    view.set('aria-posinset', position + 1);
+    view.set('aria-expanded', row.count ? node.open : undefined);
+    view.set('aria-selected', !!node && node === this.selected);
+    view.write({ twist: !row.count ? '' : node.open ? '▾' : '▸', name: row.name, text: rowText(row), unit: row.unit || '',
+      stale: row.fresh === false ? 'stale' : '', type: row.type || '' });
+    view.parts.swatch.hidden = !row.color;
+    if (row.color) view.parts.swatch.style.background = colorOf(row.text);
     if (flash) setTimeout(() => this.draw(), 1050);
-    return element;
+    return view;
   },
   // Tells the program what is on the screen, and what stands beside it.
   watch(places) {
@@ -302,9 +329,4 @@ function colorOf(text) {
   const digits = /^#?([0-9a-f]{6})$/i.exec(text);
   if (digits) return `#${digits[1]}`;
   return /^\d+$/.test(text) ? `#${(Number(text) & 0xffffff).toString(16).padStart(6, '0')}` : '#000000';
-}
-function swatch(text) {
-  const element = make('span', { className: 'swatch', 'aria-hidden': 'true' });
-  element.style.background = colorOf(text);
-  return element;
 }
