@@ -63,6 +63,7 @@ class DGNode : private DGQueuePlace, private DGChangePlace {
  private:
   friend class EvictionQueue;
   friend struct GraphState;
+  friend struct GraphAccess;
   friend struct Calculation;
   friend struct AsyncQueues;
   friend class DGIndepNode;

@@ -8,6 +8,8 @@
 namespace vesk {
 
 class DGNode;
+class GraphWatch;
+struct GraphAccess;
 struct GraphState;
 
 enum EDGFlags {
@@ -205,6 +207,7 @@ class EvictionQueue {
 
  private:
   friend class DGNode;
+  friend struct GraphAccess;
   friend struct GraphState;
   GraphState* m_state = nullptr;
   NodeList<DGQueuePlace> m_nodes;
@@ -248,10 +251,14 @@ struct GraphState : PerThread<GraphState> {
 
  private:
   friend struct Calculation;
+  friend struct AsyncQueues;
+  friend struct GraphAccess;
   friend class DGNode;
+  friend class GraphWatch;
   struct FailedRead;
   struct Steps;
   struct Rest;
+  struct Timing;
 
   // A node that the outermost read calculates; the one in front of it in the list wants it.
   struct Target {
@@ -286,7 +293,9 @@ struct GraphState : PerThread<GraphState> {
   void Update(DGNode const& node);
   void LookAtInputs(DGNode const& node);
   void Calculate(DGNode const& node);
+  void CalculateChecked(DGNode const& node);
   void CheckCalculation(DGNode const& node) const;
+  void CalculateNow(DGNode const& node);
   void CalculateHere(DGNode const& node);
   void CalculateElsewhere(DGNode const& node);
   bool Recalculate(DGNode const& node);
@@ -316,7 +325,7 @@ struct GraphState : PerThread<GraphState> {
   xvector<Target> m_targets;
   std::size_t m_lastSerial = 0;
   xvector<Step> m_steps;
-  Rest* m_rest = nullptr;  // what few reads need
+  Rest* m_rest = nullptr;  // what few reads need, and a GraphWatch
 };
 
 }  // namespace vesk

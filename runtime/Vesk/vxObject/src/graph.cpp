@@ -2,6 +2,7 @@
 // than they do.
 
 @import "Vesk/vxObject/src/parts/graph.h"
+@import "Vesk/vxObject/src/parts/graph_watch.h"
 @import "Vesk/vxObject/src/parts/calculations.h"
 @import "Vesk/vxObject/src/parts/stack.h"
 @import "Vesk/vxObject/src/parts/sources.h"

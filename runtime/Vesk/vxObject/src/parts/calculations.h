@@ -103,9 +103,18 @@ void GraphState::LookAtInputs(DGNode const& outermost) {
 }
 
 inline void GraphState::Calculate(DGNode const& node) {
-  if (node.m_isCalculating || node.m_unwound || m_rest) CheckCalculation(node);
+  if (node.m_isCalculating || node.m_unwound || m_rest) return CalculateChecked(node);
+  CalculateNow(node);
+}
+inline void GraphState::CalculateNow(DGNode const& node) {
   if (IsDeep()) return CalculateElsewhere(node);
   CalculateHere(node);
+}
+void GraphState::CalculateChecked(DGNode const& node) {
+  CheckCalculation(node);
+  Timing timing(*this, node);
+  CalculateNow(node);
+  timing.Succeed();
 }
 void GraphState::CheckCalculation(DGNode const& node) const {
   if (node.m_isCalculating) throw GraphError("cyclic dependency: " + node.Name());
@@ -169,7 +178,7 @@ void GraphState::EndOfRest() {
     m_rest->m_again.erase(m_rest->m_again.begin());
     Invalidate(*node, hard);
   }
-  delete std::exchange(m_rest, nullptr);
+  if (m_rest && !m_rest->m_watched) delete std::exchange(m_rest, nullptr);
 }
 
 // --- The calculation that runs
@@ -286,9 +295,11 @@ ssize_t AsyncQueues::Run(EQueue queue) {
     DGAsyncNode const& node = *static_cast<DGAsyncNode const*>(static_cast<DGWaitPlace const*>(waiting.First()));
     Leave(node);
     Calculation detached(GraphState::Get(), nullptr);
+    GraphState::Timing timing(GraphState::Get(), node);
     bool isChanged;
     try {
       isChanged = node.CalculateOutput();
+      timing.Succeed();
     } catch (...) {
       GraphState::Get().Invalidate(node, true);
       throw;

@@ -1,5 +1,6 @@
 // The nodes of the fields that calculations have read.
 
+@import "Vesk/vxObject/GraphWatch.h"
 @import "Vesk/vxObject/Sources.h"
 
 #include <algorithm>
@@ -72,6 +73,10 @@ typedef GraphState::Changes Changes;
 class DataNode : public Source {
  public:
   xstring Name() const override { return m_name->first; }
+  void Describe(GraphSource& source) const {
+    source.m_object = m_field->first.first;
+    source.m_name = m_name->first;
+  }
 
   static void OnRead(void const* begin, std::size_t size, void const* object, ConstStringZ name) {
     GraphState& state = GraphState::Get();
@@ -212,6 +217,11 @@ class DataNode : public Source {
 class PathNode : public Source {
  public:
   xstring Name() const override { return "model field"; }
+  void Describe(GraphSource& source) const {
+    source.m_object = m_object;
+    std::string const path = m_field < 0 ? m_place->first : std::string(1, static_cast<char>(m_field));
+    std::copy(path.begin(), path.end(), source.m_path.InitLocalBuffer(static_cast<ssize_t>(path.size())));
+  }
 
   static void OnRead(void const* object, Path const& path) {
     GraphState& state = GraphState::Get();
@@ -388,5 +398,15 @@ void DataSource::OnWrite(void const* begin, std::size_t size, void const* object
 
 void PathSource::Read(void const* object, Path const& path) { ReadSource<PathNode>(object, path); }
 void PathSource::Write(void const* object, Path const& path) { PathNode::OnWrite(object, path); }
+
+bool GraphAccess::DescribeSource(DGNode const& node, GraphSource& source) {
+  if (!(node.m_flags & DF_SOURCE)) return false;
+  if (DataNode const* data = dynamic_cast<DataNode const*>(&node)) {
+    data->Describe(source);
+  } else {
+    static_cast<PathNode const&>(node).Describe(source);
+  }
+  return true;
+}
 
 }  // namespace vesk
