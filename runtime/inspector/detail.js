@@ -8,24 +8,25 @@ function editorOf({ kind, type, value, labels, min, max, color, name }) {
   if (kind === 'bool') {
     const input = make('input', { type: 'checkbox', ...label });
     input.checked = value === true;
-    return { input, elements: [input], json: () => JSON.stringify(input.checked), isQuick: true };
+    return { input, elements: [input], json: () => JSON.stringify(input.checked), isQuick: true, take: now => { input.checked = now; } };
   }
   if (kind === 'enum') {
     const input = make('select', label, ...(labels || []).map(item => make('option', { value: item.label, disabled: item.off }, item.label)));
     if (value !== undefined && !(labels || []).some(item => item.label === value)) input.append(make('option', { value }, String(value)));
     if (value !== undefined) input.value = value;
-    return { input, elements: [input], json: () => JSON.stringify(input.value), isQuick: true };
+    return { input, elements: [input], json: () => JSON.stringify(input.value), isQuick: true, take: now => { input.value = now; } };
   }
   if (kind === 'int' || kind === 'uint' || kind === 'float') return numberEditor({ kind, type, value, min, max, color, label });
   if (kind === 'text') {
     const isColor = color && /^#[0-9a-f]{6}$/i.test(value || '');
     const input = isColor ? make('input', { type: 'color', ...label }) : make('textarea', { rows: 3, spellcheck: 'false', ...label });
     input.value = value === undefined ? '' : value;
-    return { input, elements: [input], json: () => JSON.stringify(input.value), isQuick: isColor };
+    return { input, elements: [input], json: () => JSON.stringify(input.value), isQuick: isColor, take: now => { input.value = now; } };
   }
   const input = make('input', { type: 'text', spellcheck: 'false', ...label });
   input.value = kind === 'char' ? (value === undefined ? '' : value) : value === undefined ? defaultJson(kind) : JSON.stringify(value);
-  return { input, elements: [input], json: () => (kind === 'char' ? JSON.stringify(input.value) : JSON.stringify(JSON.parse(input.value))) };
+  return { input, elements: [input], take: now => { input.value = now; },
+    json: () => (kind === 'char' ? JSON.stringify(input.value) : JSON.stringify(JSON.parse(input.value))) };
 }
 function defaultJson(kind) {
   return { list: '[]', set: '[]', map: '{}', class: '{}' }[kind] || 'null';
@@ -35,7 +36,8 @@ function numberEditor({ kind, type, value, min, max, color, label }) {
   if (color && !isWide) {
     const input = make('input', { type: 'color', ...label });
     input.value = colorOf(String(value));
-    return { input, elements: [input], json: () => String(parseInt(input.value.slice(1), 16)), isQuick: true };
+    return { input, elements: [input], json: () => String(parseInt(input.value.slice(1), 16)), isQuick: true,
+      take: now => { input.value = colorOf(String(now)); } };
   }
   const isPlain = typeof value === 'number' || (value === undefined && !isWide);
   const input = make('input', { type: isPlain ? 'number' : 'text', step: kind === 'float' ? 'any' : 1, min, max, ...label });
@@ -54,7 +56,11 @@ function numberEditor({ kind, type, value, min, max, color, label }) {
     input.addEventListener('input', () => { slider.value = input.value; });
     elements.push(slider);
   }
-  return { input, elements, json };
+  const take = now => {
+    input.value = now;
+    if (elements[1]) elements[1].value = now;
+  };
+  return { input, elements, json, take };
 }
 
 const detail = {
@@ -70,13 +76,16 @@ const detail = {
     this.node = node;
     this.isDirty = false;
     if (node) return this.load();
+    this.shape = this.drawn = '';
     this.element.replaceChildren(make('p', { className: 'empty' }, 'Select a value to see all of it.'));
   },
   // The row has changed: what is being typed stays.
   refresh(isOther) {
     if (isOther) this.isDirty = false;
-    clearTimeout(this.timer);
-    this.timer = setTimeout(() => this.node && !this.isBusy() && this.load(), 150);
+    this.timer ||= setTimeout(() => {
+      this.timer = 0;
+      if (this.node && !this.isBusy()) this.load();
+    }, 150);
   },
   isBusy() {
     const active = document.activeElement;
@@ -92,13 +101,29 @@ const detail = {
     const look = await link.ask('look', { path: node.path }).catch(error => ({ name: node.row.name, kind: 'none', text: error.message, bad: true }));
     if (node !== this.node) return;
     route.remember();
-    const method = this.openMethod();
+    // A value that changes is written over what is there: a button that moved could not be pressed.
+    const shape = JSON.stringify([node.key, { ...look, text: 0, count: 0, value: look.kind === 'variant' && look.value, has: look.value !== undefined }]);
+    this.look = look;
+    if (shape === this.shape) return this.patch(look);
+    const methods = this.typed();
+    const isSame = this.drawn === node.key;
+    this.shape = shape;
+    this.drawn = node.key;
+    this.list = this.facts(look);
+    this.editing = this.plain = null;
     this.element.replaceChildren(...[
       make('p', { className: 'path mono' }, pathText(node.path)),
       make('h2', {}, look.name),
       look.help && make('p', { className: 'note' }, look.help),
-      this.facts(look), this.value(look), this.listTools(look), this.elementTools(node), ...this.methods(look)].filter(Boolean));
-    if (method) this.restore(method);
+      this.list, this.graphTools(look, node), this.value(look), this.listTools(look), this.elementTools(node), ...this.methods(look)].filter(Boolean));
+    if (isSame) this.restore(methods);
+  },
+  patch(look) {
+    const facts = this.facts(look);
+    this.list.replaceWith(facts);
+    this.list = facts;
+    if (this.editing) this.editing.take(look.value);
+    if (this.plain) this.plain.textContent = this.plainText(look);
   },
 
   facts(look) {
@@ -117,12 +142,16 @@ const detail = {
     if (!look.editable || look.value === undefined) return this.plainValue(look);
     return look.kind === 'variant' ? this.variantEditor(look) : this.editor(look);
   },
-  plainValue(look) {
+  plainText(look) {
     const text = typeof look.value === 'string' ? look.value : look.value === undefined || look.kind !== 'variant' ? look.text : JSON.stringify(look.value, null, 1);
-    return text && make('pre', { className: look.bad ? 'bad' : '' }, text, look.unit ? ` ${look.unit}` : '');
+    return text && look.unit ? `${text} ${look.unit}` : text;
+  },
+  plainValue(look) {
+    this.plain = make('pre', { className: look.bad ? 'bad' : '' }, this.plainText(look));
+    return this.plain;
   },
   editor(look) {
-    const editor = editorOf(look);
+    const editor = this.editing = editorOf(look);
     const form = make('form', { className: 'line editor' }, ...editor.elements, look.unit && make('span', { className: 'note' }, look.unit),
       !editor.isQuick && make('button', { className: 'main' }, 'Set'));
     return this.wire(form, editor);
@@ -158,9 +187,19 @@ const detail = {
     const form = make('form', { className: 'line editor' }, select, text, make('button', { className: 'main' }, 'Set'));
     return this.wire(form, { input: text, json });
   },
+  graphTools(look, node) {
+    if (look.fresh === undefined && !look.graph) return null;
+    const calculate = async () => {
+      await attempt(link.ask('calculate', { path: node.path }));
+      this.load();
+    };
+    return make('div', { className: 'line' },
+      make('button', { type: 'button', onclick: () => graph.show({ path: node.path }, pathText(node.path)) }, 'Graph'),
+      look.fresh === false && link.hello.changes && make('button', { type: 'button', onclick: calculate }, 'Calculate'));
+  },
   listTools(look) {
     if (!look.list) return null;
-    const add = () => this.change('insert', { path: this.node.path, at: look.count || 0 });
+    const add = () => this.change('insert', { path: this.node.path, at: this.look.count || 0 });
     return make('div', { className: 'line' }, make('button', { type: 'button', onclick: add }, 'Add an element'));
   },
   elementTools(node) {
@@ -212,23 +251,20 @@ const detail = {
     return form;
   },
   // What was typed and answered, over a new drawing.
-  openMethod() {
+  typed() {
     return [...this.element.querySelectorAll('.method')].map(form => ({
       name: form.dataset.method, result: form.querySelector('.result').textContent,
-      values: [...form.elements].map(input => (input.type === 'checkbox' ? input.checked : input.value)), path: this.drawnPath }));
+      values: [...form.elements].map(input => (input.type === 'checkbox' ? input.checked : input.value)) }));
   },
   restore(methods) {
-    if (this.drawnPath === this.node.key) {
-      for (const { name, result, values } of methods) {
-        const form = [...this.element.querySelectorAll('.method')].find(each => each.dataset.method === name);
-        if (!form || form.elements.length !== values.length) continue;
-        form.querySelector('.result').textContent = result;
-        [...form.elements].forEach((input, i) => {
-          if (input.type === 'checkbox') input.checked = values[i];
-          else if (input.tagName !== 'BUTTON') input.value = values[i];
-        });
-      }
+    for (const { name, result, values } of methods) {
+      const form = [...this.element.querySelectorAll('.method')].find(each => each.dataset.method === name);
+      if (!form || form.elements.length !== values.length) continue;
+      form.querySelector('.result').textContent = result;
+      [...form.elements].forEach((input, i) => {
+        if (input.type === 'checkbox') input.checked = values[i];
+        else if (input.tagName !== 'BUTTON') input.value = values[i];
+      });
     }
-    this.drawnPath = this.node.key;
   },
 };

@@ -72,16 +72,27 @@ const link = {
     if (message.error !== undefined) waiting.fail(new Error(message.error));
     else waiting.done(message.ok);
   },
+  // A request with bytes behind it.
+  send(message, bytes) {
+    const head = new TextEncoder().encode(`${JSON.stringify({ id: ++this.lastId, ...message })}\n`);
+    const data = new Uint8Array(head.length + bytes.byteLength);
+    data.set(head);
+    data.set(new Uint8Array(bytes), head.length);
+    return this.wait(this.lastId, data);
+  },
   // A promise of the answer. `json` has members that are put in as they are: JSON that was written already.
   ask(request, members = {}, json = {}) {
     const id = ++this.lastId;
     let text = JSON.stringify({ id, do: request, ...members }).slice(0, -1);
     for (const [name, value] of Object.entries(json)) text += `,${JSON.stringify(name)}:${value}`;
     text += '}';
+    return this.wait(id, text);
+  },
+  wait(id, data) {
     return new Promise((done, fail) => {
       if (!this.socket || this.socket.readyState !== WebSocket.OPEN) return fail(new Error('the program is gone'));
       this.waiting.set(id, { done, fail });
-      this.socket.send(text);
+      this.socket.send(data);
     });
   },
 };

@@ -14,14 +14,14 @@ function addView(name, title, ...children) {
 
 const route = {
   view: 'objects',
-  go(view) {
+  go(view, isFirst) {
     this.view = views[view] ? view : 'objects';
     for (const [name, { tab, panel }] of Object.entries(views)) {
       tab.setAttribute('aria-selected', String(name === this.view));
       tab.tabIndex = name === this.view ? 0 : -1;
       panel.hidden = name !== this.view;
     }
-    this.remember();
+    if (!isFirst) this.remember();
     tree.draw();
     if (views[this.view].onShow) views[this.view].onShow();
   },
@@ -144,6 +144,8 @@ function start() {
   const typeList = make('ul', { className: 'names', 'aria-label': 'Types' });
   addView('types', 'Types', typeList, typeSide).classList.add('split', 'types');
   changes.start(addView('changes', 'Changes'));
+  graph.start(addView('graph', 'Graph'));
+  archives.start(addView('archives', 'Archives'));
   search.start(left);
   tree.start(treeElement);
   detail.start(side);
@@ -155,7 +157,7 @@ function start() {
     route.read();
   });
   window.addEventListener('hashchange', () => route.read());
-  route.go('objects');
+  route.go(location.hash.slice(1).split('/')[0], true);
   link.open();
 }
 // Only once: `hello` comes again with each link.

@@ -55,6 +55,9 @@ class Inspector {
   // Lets pages change values and call methods.
   void AllowChanges(bool isAllowed = true) { m_shared.m_changes.Allow(isAllowed); }
 
+  // Whether pages may show archives, of which the objects are made and destroyed again: they may unless it is told.
+  void TakeArchives(bool takes) { m_shared.m_takesArchives = takes; }
+
   // Begins to listen, on this machine alone; port 0 is any that is free. The address of the page, of which the token is
   // a secret. InspectorError when the port is taken.
   xstring Listen(uint16 port = 0) {

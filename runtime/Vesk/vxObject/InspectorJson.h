@@ -4,6 +4,7 @@
 @import "Vesk/vxObject/Access.h"
 
 #include <charconv>
+#include <optional>
 
 namespace vesk {
 

@@ -1,6 +1,8 @@
 // The page of the inspector, put together of its parts: runtime/inspector has them as one edits them.
 
+@import "Vesk/vxObject/InspectorPage_archiveJs.h"
 @import "Vesk/vxObject/InspectorPage_detailJs.h"
+@import "Vesk/vxObject/InspectorPage_graphJs.h"
 @import "Vesk/vxObject/InspectorPage_linkJs.h"
 @import "Vesk/vxObject/InspectorPage_mainJs.h"
 @import "Vesk/vxObject/InspectorPage_pageCss.h"
@@ -14,7 +16,7 @@ namespace vesk {
 // With the nonce by which the browser knows its scripts and styles.
 inline xstring InspectorPageText(std::string_view nonce) {
   const std::string_view scripts[] = {kInspectorLinkJs, kInspectorTreeJs, kInspectorDetailJs, kInspectorTypesJs,
-                                      kInspectorMainJs};
+                                      kInspectorGraphJs, kInspectorArchiveJs, kInspectorMainJs};
   xstring page, script;
   for (std::string_view part : scripts) script += part;
   std::string_view rest = kInspectorPageHtml;

@@ -230,7 +230,8 @@ class InspectorServer {
         self->m_isMessageAwaited = false;
         if (error || !self->TakeTurn()) return self->End();
         const auto data = self->m_buffer.cdata();
-        self->m_session->Receive(std::string_view(static_cast<char const*>(data.data()), data.size()));
+        self->m_session->Receive(std::string_view(static_cast<char const*>(data.data()), data.size()),
+                                  self->m_stream.got_text());
         self->m_buffer.consume(self->m_buffer.size());
         if (self->m_buffer.capacity() > kMostAnswered) self->m_buffer.shrink_to_fit();
         self->ReadMessage();
@@ -304,6 +305,7 @@ class InspectorServer {
 
   void Tick() {
     m_shared.m_log.Listen(m_pages > 0);
+    if (m_pages == 0) m_shared.m_graph.Forget();
     xvector<std::shared_ptr<Connection>> due;
     for (Connection* connection : m_connections) {
       InspectorSession* const session = connection->Session();

@@ -9,12 +9,18 @@
 //   find   text                   begins a search, ends the one before
 //   set    path, value            changes, where the program allows them; `insert` without a value makes a fresh one
 //   insert path, at, value; remove path, at; move path, from, to; undo; redo
-//   call   path, method, args
+//   call   path, method, args;  calculate path     what is stale
+//   graph  path or node, depth    the dependency graph around a value
+//   parts  slot, first, count     of an archive; compare: how that in slot 1 differs from that in slot 0
+//
+// A message of bytes is a line of JSON, {"id": 8, "do": "archive", "slot": 0}, and behind it an archive.
 //
 // It is told {"push": "rows", ...} what changed of the rows that it watches, "log" what hooks told, "found" what a
 // search found, "undo" what could be undone: together at most kMostMessages a second.
 
+@import "Vesk/vxObject/InspectorArchives.h"
 @import "Vesk/vxObject/InspectorCalls.h"
+@import "Vesk/vxObject/InspectorGraph.h"
 @import "Vesk/vxObject/InspectorLog.h"
 @import "Vesk/vxObject/InspectorSearch.h"
 @import "Vesk/vxObject/InspectorTypes.h"
@@ -27,6 +33,8 @@ struct InspectorShared {
   InspectorChanges m_changes{m_tree};
   InspectorCalls m_calls{m_tree};
   InspectorLog m_log;
+  InspectorGraph m_graph{m_tree};
+  bool m_takesArchives = true;
   xstring m_title;
 };
 
@@ -36,17 +44,21 @@ class InspectorSession {
   typedef std::function<void(xstring const& message)> SendFunction;
   static constexpr int kMostMessages = 20;  // a second, that nobody asked for
   static constexpr ssize_t kMostRows = 400;
+  static constexpr std::size_t kMostText = 1 << 20;  // bytes of a message ahead of an archive
 
   InspectorSession(InspectorShared& shared, SendFunction send) : m_shared(shared), m_send(std::move(send)) {}
   InspectorSession(InspectorSession const&) = delete;
   void operator=(InspectorSession const&) = delete;
 
   // A message of the page. Whatever it is, an answer comes of it, and nothing is thrown but for want of memory.
-  void Receive(std::string_view text) {
+  void Receive(std::string_view text, bool isText = true) {
     InspectorWriter out;
     out.Open('{');
     try {
-      const InspectorJson message = InspectorJson::Parse(text);
+      const std::size_t line = isText ? text.size() : std::min(text.find('\n'), text.size());
+      if (line > kMostText) throw InspectorError("the message is too large");
+      const InspectorJson message = InspectorJson::Parse(text.substr(0, line));
+      m_bytes = text.substr(line);
       out.Member("id", message["id"].AsCount(0));
       try {
         InspectorWriter answer;
@@ -109,7 +121,10 @@ class InspectorSession {
         {"watch", &InspectorSession::Watch},   {"types", &InspectorSession::Types},   {"type", &InspectorSession::Type},
         {"find", &InspectorSession::Find},     {"set", &InspectorSession::Set},       {"insert", &InspectorSession::Insert},
         {"remove", &InspectorSession::Remove}, {"move", &InspectorSession::Move},     {"undo", &InspectorSession::Undo},
-        {"redo", &InspectorSession::Redo},     {"call", &InspectorSession::Call}};
+        {"redo", &InspectorSession::Redo},     {"call", &InspectorSession::Call},
+        {"calculate", &InspectorSession::Calculate}, {"graph", &InspectorSession::Graph},
+        {"archive", &InspectorSession::Archive}, {"parts", &InspectorSession::Parts},
+        {"compare", &InspectorSession::Compare}};
     xstring const& name = message["do"].AsText();
     for (Request const& request : kRequests) {
       if (request.m_name == name) return (this->*request.m_handler)(out, message);
@@ -187,6 +202,7 @@ class InspectorSession {
                                                              place.m_value.Kind() == VK_VARIANT));
     out.Member("list", mayChange && !opened.m_isFixed && InspectorRows::IsList(opened));
     InspectorTypes::PutMetadata(out, place.m_declared.m_metadata);
+    if (m_shared.m_graph.IsIn(message["path"], place)) out.Member("graph", true);
     ReflectedClass const* const record = opened.m_value ? opened.m_value.Class() : nullptr;
     if (!record) return;
     out.Member("class", record->m_name);
@@ -220,6 +236,29 @@ class InspectorSession {
     m_shared.m_changes.CheckAllowed();
     m_shared.m_calls.Call(out, message["path"], message["method"].AsText(), message["args"]);
   }
+
+  void Calculate(InspectorWriter&, InspectorJson const& message) {
+    m_shared.m_changes.CheckAllowed();
+    const InspectorPlace place = m_shared.m_tree.Find(message["path"]);
+    if (!place.m_node) throw InspectorError("the value is not calculated");
+    place.m_node->ReadBarrier();
+  }
+
+  // --- Graph and archives
+
+  void Graph(InspectorWriter& out, InspectorJson const& message) {
+    m_shared.m_graph.Put(out, message["path"], static_cast<uint64>(message["node"].AsCount(0)), message["depth"].AsCount(3));
+  }
+  void Archive(InspectorWriter& out, InspectorJson const& message) {
+    if (!m_shared.m_takesArchives) throw InspectorError("the program takes no archives");
+    if (m_bytes.empty()) throw InspectorError("no archive came");
+    const InspectorJson type = message["type"];
+    m_archives.Open(out, message["slot"].AsCount(0), type.m_text, m_bytes.substr(1));
+  }
+  void Parts(InspectorWriter& out, InspectorJson const& message) {
+    m_archives.Parts(out, message["slot"].AsCount(0), message["first"].AsCount(0), message["count"].AsCount(100));
+  }
+  void Compare(InspectorWriter& out, InspectorJson const&) { m_archives.Compare(out); }
 
   // --- What it is told
 
@@ -297,6 +336,8 @@ class InspectorSession {
   Clock::time_point m_next;
   xvector<Range> m_ranges;
   InspectorSearch m_search;
+  InspectorArchives m_archives;
+  std::string_view m_bytes;  // behind the line of the message that is answered
   xstring m_undo, m_redo;
 };
 
