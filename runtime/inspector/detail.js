@@ -198,7 +198,7 @@ const detail = {
       look.fresh === false && link.hello.changes && make('button', { type: 'button', onclick: calculate }, 'Calculate'));
   },
   listTools(look) {
-    if (!look.list) return null;
+    if (look.list !== 'all') return null;
     const add = () => this.change('insert', { path: this.node.path, at: this.look.count || 0 });
     return make('div', { className: 'line' }, make('button', { type: 'button', onclick: add }, 'Add an element'));
   },
@@ -210,11 +210,12 @@ const detail = {
     const move = to => async () => {
       if (await this.change('move', { path, from: at, to }) !== undefined) tree.go(tree.selected.index() + to - at);
     };
+    const isPlain = !list.row.type.includes('ref<');  // references only change their order
     return make('div', { className: 'line' },
-      make('button', { type: 'button', onclick: () => this.change('insert', { path, at }) }, 'Insert ahead'),
+      isPlain && make('button', { type: 'button', onclick: () => this.change('insert', { path, at }) }, 'Insert ahead'),
       make('button', { type: 'button', onclick: move(at - 1), disabled: at === 0 }, 'Move up'),
       make('button', { type: 'button', onclick: move(at + 1), disabled: at + 1 >= list.count }, 'Move down'),
-      make('button', { type: 'button', onclick: () => this.change('remove', { path, at }) }, 'Remove'));
+      isPlain && make('button', { type: 'button', onclick: () => this.change('remove', { path, at }) }, 'Remove'));
   },
   async change(request, members, json) {
     const answer = await attempt((async () => link.ask(request, members, json && { value: json() }))());

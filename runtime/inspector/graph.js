@@ -86,7 +86,7 @@ const graph = {
   node(node, isSubject) {
     const state = { fresh: 'up to date', unsure: 'to be looked at', stale: 'stale', running: 'being calculated' }[node.state];
     const counts = node.kind === '$indep' || node.kind === 'field' ? node.kind
-      : node.count ? `${node.count} × ${timeText(Math.round(node.total / node.count))}${node.failed ? `, ${node.failed} failed` : ''}` : `${node.kind}, not calculated since`;
+      : node.count ? `${node.count} × ${timeText(Math.round(node.total / node.count))}${node.failed ? `, ${node.failed} failed` : ''}` : node.kind;
     const value = node.empty ? state : node.text === undefined ? state : `${node.text}${node.state === 'fresh' ? '' : ` (${state})`}`;
     const name = node.name || node.kind;
     const element = draw('g', { class: `node ${node.state}${isSubject ? ' subject' : ''}`, transform: `translate(${node.x},${node.y})`, tabindex: 0, role: 'button',

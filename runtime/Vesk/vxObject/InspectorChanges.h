@@ -3,7 +3,8 @@
 // anything changes: the text by the reader of JSON, the number against the range in the metadata.
 //
 // What is kept of a change is a copy of the value before and after it, or of the element that came or went. It is undone
-// while what it made is still there: not when the program has changed the place meanwhile.
+// while what it made is still there: not when the program has changed the place meanwhile. References are not changed:
+// a copy might outlive what it refers to. Lists of them are only put in another order.
 
 @import "Vesk/vxObject/InspectorRows.h"
 
@@ -45,10 +46,18 @@ class InspectorCopy {
   HeldValue m_held;
 };
 
-// InspectorError unless the numbers in a value are what the metadata allow.
+// InspectorError unless the numbers in a value are what the metadata allow: its own, for the fields of a class theirs, and
+// for the elements of a container what is said of it.
 inline void CheckInspectorRange(Value const& value, xvector<MetadataValue> const& metadata) {
-  const InspectorMetadata range(metadata);
   const EValueKind kind = value.Kind();
+  if (kind == VK_CLASS || kind == VK_LIST || kind == VK_SET || kind == VK_MAP) {
+    value.Each([&](xstring const& name, Value const& inner) {
+      CheckInspectorRange(inner, kind == VK_CLASS ? InspectorDeclared(*value.Class(), name).m_metadata : metadata);
+      return true;
+    });
+    return;
+  }
+  const InspectorMetadata range(metadata);
   if ((!range.m_hasLeast && !range.m_hasMost) || (kind != VK_INT && kind != VK_UINT && kind != VK_FLOAT)) return;
   const xstring text = value.Text();
   const float64 number = std::strtod(text.c_str(), nullptr);
@@ -70,9 +79,13 @@ class InspectorChanges {
     if (!m_isAllowed) throw InspectorError("the program does not allow changes");
   }
 
+  // Whether values of the type may come and go.
+  static bool IsPlain(Value const& value, ValueType const& type) { return !HasReferences(*value.Types(), type); }
+
   // Gives the value at a path what the JSON says.
   void Set(InspectorJson const& path, InspectorJson const& json) {
     InspectorPlace const place = Changeable(path);
+    CheckPlain(place.m_value, place.m_value.Type());
     Change change(Change::Set, path, place.m_name);
     change.m_before = std::make_shared<InspectorCopy>(place.m_value);
     change.m_after = Made(place, place.m_value.Type(), json);
@@ -84,8 +97,10 @@ class InspectorChanges {
     Change change(Change::Insert, path, place.m_name);
     change.m_from = at;
     ValueType const& item = *place.m_value.Type().m_item;
+    CheckPlain(place.m_value, item);
     InspectorPlace element;
     element.m_declared = InspectorInner(place.m_declared);
+    if (element.m_declared.m_metadata.empty()) element.m_declared.m_metadata = place.m_declared.m_metadata;
     element.m_value = place.m_value;
     change.m_after = json.m_kind == InspectorJson::Null
                          ? std::make_shared<InspectorCopy>(place.m_value.Types(), item)
@@ -94,6 +109,7 @@ class InspectorChanges {
   }
   void Remove(InspectorJson const& path, ssize_t at) {
     InspectorPlace const place = List(path);
+    CheckPlain(place.m_value, *place.m_value.Type().m_item);
     Change change(Change::Remove, path, place.m_name);
     change.m_from = at;
     change.m_before = std::make_shared<InspectorCopy>(place.m_value.At(at));
@@ -131,6 +147,9 @@ class InspectorChanges {
   typedef xdeque<Change> Changes;
   static constexpr std::size_t kMostChanges = 200;
 
+  static void CheckPlain(Value const& value, ValueType const& type) {
+    if (!IsPlain(value, type)) throw InspectorError("references are not changed from here");
+  }
   InspectorPlace Changeable(InspectorJson const& path) const {
     CheckAllowed();
     InspectorPlace place = m_tree.Find(path);
@@ -154,16 +173,8 @@ class InspectorChanges {
     limits.m_allow = [](ReflectedClass const&) { return false; };
     FromJson(value, json.m_raw, limits);
     CheckInspectorRange(value, place.m_declared.m_metadata);
-    if (type.m_kind == VK_CLASS) CheckFields(value);
     return made;
   }
-  static void CheckFields(Value const& value) {
-    value.Each([&](xstring const& name, Value const& field) {
-      CheckInspectorRange(field, InspectorDeclared(*value.Class(), name).m_metadata);
-      return true;
-    });
-  }
-
   void Do(Change change) {
     Apply(change, false);
     m_undone.clear();

@@ -88,7 +88,7 @@ constexpr std::string_view kInspectorGraphJs =
     "  node(node, isSubject) {\n"
     "    const state = { fresh: 'up to date', unsure: 'to be looked at', stale: 'stale', running: 'being calculated' }[node.state];\n"
     "    const counts = node.kind === '\x24indep' || node.kind === 'field' ? node.kind\n"
-    "      : node.count ? `\x24{node.count} \xc3\x97 \x24{timeText(Math.round(node.total / node.count))}\x24{node.failed ? `, \x24{node.failed} failed` : ''}` : `\x24{node.kind}, not calculated since`;\n"
+    "      : node.count ? `\x24{node.count} \xc3\x97 \x24{timeText(Math.round(node.total / node.count))}\x24{node.failed ? `, \x24{node.failed} failed` : ''}` : node.kind;\n"
     "    const value = node.empty ? state : node.text === undefined ? state : `\x24{node.text}\x24{node.state === 'fresh' ? '' : ` (\x24{state})`}`;\n"
     "    const name = node.name || node.kind;\n"
     "    const element = draw('g', { class: `node \x24{node.state}\x24{isSubject ? ' subject' : ''}`, transform: `translate(\x24{node.x},\x24{node.y})`, tabindex: 0, role: 'button',\n"

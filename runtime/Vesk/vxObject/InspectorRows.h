@@ -28,8 +28,9 @@ class InspectorRows {
     if (count > 0) out.Member("count", count);
     out.Member("text", Text(place));
     const InspectorMetadata metadata(place.m_declared.m_metadata);
-    if (!metadata.m_unit.empty()) out.Member("unit", metadata.m_unit);
-    if (metadata.m_isColor) out.Member("color", true);
+    const bool isScalar = IsScalar(place.m_value.Kind());
+    if (isScalar && !metadata.m_unit.empty()) out.Member("unit", metadata.m_unit);
+    if (isScalar && metadata.m_isColor) out.Member("color", true);
     if (place.m_node) out.Member("fresh", place.m_node->IsUpToDate());
   }
 

@@ -200,7 +200,9 @@ class InspectorSession {
     const bool mayChange = m_shared.m_changes.IsAllowed();
     out.Member("editable", mayChange && !place.m_isFixed && (InspectorRows::IsScalar(place.m_value.Kind()) ||
                                                              place.m_value.Kind() == VK_VARIANT));
-    out.Member("list", mayChange && !opened.m_isFixed && InspectorRows::IsList(opened));
+    if (mayChange && !opened.m_isFixed && InspectorRows::IsList(opened)) {
+      out.Member("list", InspectorChanges::IsPlain(opened.m_value, *opened.m_value.Type().m_item) ? "all" : "order");
+    }
     InspectorTypes::PutMetadata(out, place.m_declared.m_metadata);
     if (m_shared.m_graph.IsIn(message["path"], place)) out.Member("graph", true);
     ReflectedClass const* const record = opened.m_value ? opened.m_value.Class() : nullptr;

@@ -194,7 +194,13 @@ class InspectorTree {
     place.m_value = value;
     const EValueKind kind = outer.m_value.Kind();
     place.m_isFixed = outer.m_isFixed || kind == VK_SET;
-    place.m_declared = kind == VK_CLASS ? InspectorDeclared(*outer.m_value.Class(), name) : InspectorInner(outer.m_declared);
+    if (kind == VK_CLASS) {
+      place.m_declared = InspectorDeclared(*outer.m_value.Class(), name);
+    } else {
+      // What is said of a list of numbers is said of the numbers.
+      place.m_declared = InspectorInner(outer.m_declared);
+      if (place.m_declared.m_metadata.empty()) place.m_declared.m_metadata = outer.m_declared.m_metadata;
+    }
     return place;
   }
   static InspectorPlace Dep(InspectorPlace const& outer, ReflectedDepField const& field) {

@@ -118,6 +118,9 @@ void ResizeList(ValueType const& type, void* container, ssize_t count);
 // The entry of the key that `fill` completes, its value fresh. Null when a set or map has the key already.
 void* InsertEntry(ValueType const& type, void* container, ValueFunction const& fill);
 
+// Whether a pref or cref may stand in such a value.
+bool HasReferences(ValueTypes& types, ValueType const& type);
+
 // --- Copies. Both values are of the type; AccessError for what cannot be copied. After an error `to` is any value.
 
 void CopyValue(ValueType const& type, void* to, void const* from);
