@@ -57,8 +57,11 @@ class Program:
     def request(self, text):
         """The first line of the answer to these bytes; empty where the connection is closed without one."""
         with self.connect() as client:
-            client.sendall(text.encode("latin-1"))
-            return client.recv(4096).decode("latin-1").split("\r\n")[0]
+            try:
+                client.sendall(text.encode("latin-1"))
+                return client.recv(4096).decode("latin-1").split("\r\n")[0]
+            except ConnectionResetError:
+                return ""
 
     def connect(self):
         host, port = self.host.split(":")

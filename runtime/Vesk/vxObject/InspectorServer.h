@@ -96,9 +96,10 @@ class InspectorServer {
   }
   // In a time that tells nothing of how much was right.
   static bool IsSame(std::string_view given, std::string_view secret) {
+    if (given.empty()) return false;
     int difference = given.size() != secret.size();
-    for (std::size_t i = 0; i < secret.size(); ++i) difference |= secret[i] ^ given[given.empty() ? 0 : i % given.size()];
-    return difference == 0 && !given.empty();
+    for (std::size_t i = 0; i < secret.size(); ++i) difference |= secret[i] ^ given[i % given.size()];
+    return difference == 0;
   }
 
   // One connection: a request at a time, until one of them makes it a page's.
@@ -214,6 +215,7 @@ class InspectorServer {
       m_session = std::make_unique<InspectorSession>(m_server.m_shared, [this](xstring const& text) { Send(text); });
       m_buffer = boost::beast::flat_buffer(m_server.m_limits.m_message + kRoom);
       Tcp1().expires_after(m_server.m_limits.m_time);
+      m_stream.auto_fragment(false);
       m_stream.read_message_max(m_server.m_limits.m_message);
       m_stream.async_accept(request, [self = shared_from_this()](Error error) {
         if (error) return self->Close();
