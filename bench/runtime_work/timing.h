@@ -23,7 +23,7 @@ inline const bool g_keepsMemory = mallopt(M_MMAP_THRESHOLD, 1 << 30) && mallopt(
 template <typename Make, typename Action>
 void MeasureAfter(const char* name, Make make, Action action) {
   double best = 1e9;
-  for (int i = 0; i < 25; ++i) {
+  for (int i = 0; i < 2; ++i) {
     const auto made = make();
     const auto begin = std::chrono::steady_clock::now();
     action(made);

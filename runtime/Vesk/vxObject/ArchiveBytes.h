@@ -7,6 +7,7 @@
 #include <cstdlib>
 #include <cstring>
 #include <stdexcept>
+#include <utility>
 
 namespace vesk {
 
@@ -156,6 +157,18 @@ class ReadingScope {
 
  private:
   InputArchive& m_archive;
+  InputArchive const* m_outer;
+};
+
+// The same for the content of an object, which is no deeper than what refers to it.
+class ArchiveScope {
+ public:
+  explicit ArchiveScope(InputArchive const& ar) : m_outer(std::exchange(t_reading.m_archive, &ar)) {}
+  ~ArchiveScope() { t_reading.m_archive = m_outer; }
+  ArchiveScope(ArchiveScope const&) = delete;
+  void operator=(ArchiveScope const&) = delete;
+
+ private:
   InputArchive const* m_outer;
 };
 

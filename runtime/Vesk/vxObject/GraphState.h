@@ -293,9 +293,8 @@ struct GraphState : PerThread<GraphState> {
   void Update(DGNode const& node);
   void LookAtInputs(DGNode const& node);
   void Calculate(DGNode const& node);
-  void CalculateChecked(DGNode const& node);
-  void CheckCalculation(DGNode const& node) const;
-  void CalculateNow(DGNode const& node);
+  bool CalculateWatched(DGNode const& node);
+  void CalculateTimed(DGNode const& node);
   void CalculateHere(DGNode const& node);
   void CalculateElsewhere(DGNode const& node);
   bool Recalculate(DGNode const& node);

@@ -122,6 +122,8 @@ bool ListsInterface(ReflectedClass const& record, ConstStringZ name);
 
 // Makes an object of the class that the archive names. `fits`: whether a class is what the reference asks for.
 NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedClass const&)> const& fits);
+// Of a class that can be created.
+NumberedObject MakePersistable(ReflectedClass const& record);
 
 template <typename C>
 NumberedObject MakeStruct() {

@@ -13,6 +13,7 @@ enum class EPathStep : octet_t {
   Field,    // ".label"
   Element,  // "[position]"
   Entry,    // "[key]", of a map: the key is the first node in it
+  Key,      // the same as of the entry
   Object    // "#position": a path begins
 };
 
@@ -30,6 +31,27 @@ struct ArchiveNode {
   ValueType const* m_type = nullptr;  // of a value, a class, a container
   ConstStringZ m_label = nullptr;     // of a field; the text of what has no value
 };
+
+// Nodes that stand in a group, not in another one in it. The contents of objects are none of it.
+template <typename Each>
+void EachArchiveChild(xvector<ArchiveNode> const& nodes, uint32 group, Each each) {
+  for (uint32 at = group + 1; at < nodes[group].m_end; at = nodes[at].m_end) {
+    if (nodes[at].m_step != EPathStep::Object) each(at);
+  }
+}
+
+// Whether a limit or an error may have cut off what else stands in a group.
+inline bool IsCutOff(xvector<ArchiveNode> const& nodes, uint32 group) {
+  return nodes.back().m_kind == AP_REST && nodes[group].m_end + 1 >= nodes.size();
+}
+// The value of a map's entry; any other node itself.
+inline uint32 ArchiveValueIn(xvector<ArchiveNode> const& nodes, uint32 node) {
+  if (nodes[node].m_step != EPathStep::Entry || node + 1 >= nodes[node].m_end) return node;
+  const uint32 value = nodes[node + 1].m_end;
+  return value < nodes[node].m_end ? value : node;
+}
+
+enum EArchiveName { AN_PROJECT, AN_CLASS, AN_TYPE };
 
 // An object as it was mentioned first.
 struct ArchivedObject {
@@ -52,7 +74,8 @@ struct ArchiveView::Content {
   xvector<std::size_t> m_firstParts;  // of each node; those of a block are many. At the end that of all.
   xvector<ArchivedObject> m_objects;
   xvector<ArchiveRelease> m_releases;
-  ValueType const* m_type = nullptr;  // of what was written by `<<`
+  ReflectedType m_declared;           // of what was written by `<<`
+  ValueType const* m_type = nullptr;  // the same; null in an archive of objects
   TypeOps const* m_ops = nullptr;
   std::shared_ptr<void> m_hold;
   void* m_value = nullptr;  // what was read of it, held; or null
@@ -69,6 +92,12 @@ xstring ArchivePathText(ArchiveView::Content const& content, uint32 node);
 // Of a node that is no block and no group.
 xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& node);
 xstring LimitText(std::string_view text, std::size_t most);
+
+// Of a group, too: "3 elements", or the name of its type.
+xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node);
+
+// The model that a class is archived by; null for a class without one.
+ReflectedClass const* ModelOf(ReflectedClass const& record);
 
 // A compact integer that is known to stand there.
 uint32 CompactAt(octet_t const* bytes);

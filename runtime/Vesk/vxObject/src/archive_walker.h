@@ -1,7 +1,7 @@
 // Takes an archive apart along the records of its types, as `>>` would read it: with the same releases, limits and
 // errors. What records do not tell is read by the program's own code, into values that are made for it. That code also
-// reads each object as of today, ahead of the walk: where both do not end at the same byte, the walk begins again and
-// looks for the class whose record does not tell how it is written, whose bytes are then shown as they are.
+// reads each object as of today, ahead of the walk: should both not end at the same byte, the record does not tell how
+// the object is written, and its bytes are shown as they are.
 
 @import "Vesk/vxObject/src/archive_view.h"
 
@@ -39,6 +39,7 @@ class ArchiveWalker {
     bool m_isKnown = false;
     bool m_hasRelease = false;  // begins with that of its project
     bool m_asksRelease = false;
+    bool m_isOpen = false;                   // a field has no record
     XTarget const* m_target = nullptr;       // of the class
     XTarget const* m_modelTarget = nullptr;  // of its model
     RSN m_first = 0;
@@ -58,9 +59,17 @@ class ArchiveWalker {
   Layout const& LayoutOf(ReflectedClass const& record);
   void FillLayout(Layout& layout, ReflectedClass const& record);
   static bool BeginsWithRelease(ReflectedClass const& record);
-  // Where a value ends that begins here. The objects that it mentions count as mentioned when `mentions`.
-  std::size_t Probe(TypeOps const& ops, bool mentions);
-  void NoteMentioned(std::size_t first);
+  // Where a value ends that begins here, and what it mentions.
+  struct Extent {
+    std::size_t m_end;
+    xvector<ArchivedObject> m_mentioned;
+    ReleaseList m_releases;
+  };
+  template <typename Read>
+  Extent Probe(Read read);
+  Extent ProbeValue(TypeOps const& ops);
+  Extent ProbeClass(ReflectedClass const& record);
+  xvector<ArchivedObject> ObjectsFrom(std::size_t first);
   // Reads what begins here; the walk stays where it is. False once that has failed.
   template <typename Read>
   bool ReadAhead(Read read);
@@ -80,17 +89,18 @@ class ArchiveWalker {
   void WalkText(ValueType const& type, Step step);
   void WalkEnum(ValueType const& type, Step step);
   void WalkClass(ValueType const& type, Step step);
-  void WalkUnchecked(ValueType const& type, Step step);
-  void WalkFields(Layout const& layout);
+  void WalkOpened(ValueType const& type, Step step);
+  void WalkFields(Layout const& layout, Extent const& extent);
   void WalkContainer(ValueType const& type, Step step);
   void WalkEntries(ValueType const& type, std::size_t count);
   void WalkBlock(ValueType const& item, std::size_t count);
   void WalkVariant(ValueType const& type, Step step);
   void WalkOpenVariant(ValueType const& type, Step step);
   void WalkReference(ValueType const& type, Step step);
-  ValueType const* WalkClassName();
+  ValueType const* WalkClassName(Step step);
+  void AddName(EArchiveName what, Step step = Step());
   void AddRelease(XTarget const* target);  // null: not of this program
-  void WalkBytes(TypeOps const& ops);
+  void WalkBytes(Extent const& extent, std::size_t firstMentioned, Step step = Step());
   xstring TakeText();
 
   Mark Here() const;

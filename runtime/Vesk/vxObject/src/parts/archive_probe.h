@@ -12,12 +12,16 @@ ArchiveWalker::Layout const& ArchiveWalker::LayoutOf(ReflectedClass const& recor
   return at->second;
 }
 
+ReflectedClass const* ModelOf(ReflectedClass const& record) {
+  if (record.m_flags & CF_REFERENCES_MODEL) {
+    return Find<ReflectedClass>(record.m_modelFields[record.m_numModelFields - 1].m_name);
+  }
+  return record.m_flags & (CF_MODEL | CF_HAS_MODEL) ? &record : nullptr;
+}
+
 // The fields stand in the order in which they are archived, those that were dropped included.
 void ArchiveWalker::FillLayout(Layout& layout, ReflectedClass const& record) {
-  ReflectedClass const* model = record.m_flags & (CF_MODEL | CF_HAS_MODEL) ? &record : nullptr;
-  if (record.m_flags & CF_REFERENCES_MODEL) {
-    model = Find<ReflectedClass>(record.m_modelFields[record.m_numModelFields - 1].m_name);
-  }
+  ReflectedClass const* const model = ModelOf(record);
   layout.m_target = TargetOf(record);
   layout.m_modelTarget = model ? TargetOf(*model) : nullptr;
   if (!layout.m_target || !layout.m_modelTarget) return;
@@ -28,6 +32,7 @@ void ArchiveWalker::FillLayout(Layout& layout, ReflectedClass const& record) {
     if (!field.m_type) continue;
     if (layout.m_fields.empty() || field.m_added < layout.m_first) layout.m_first = field.m_added;
     layout.m_fields.push_back({&field, &m_content.m_types.Of(DecodeType({field.m_type, model->m_strings}))});
+    layout.m_isOpen |= layout.m_fields.back().m_type->m_kind == VK_NONE;
   }
   layout.m_asksRelease = LastRelease(*model) > layout.m_first;
 }
@@ -109,21 +114,48 @@ class FirstObjects {
 
 }  // namespace
 
-std::size_t ArchiveWalker::Probe(TypeOps const& ops, bool mentions) {
-  const std::size_t known = m_content.m_objects.size();
-  const FirstObjects objects(m_archive.m_objects, known, m_isInReference);
-  const Scratch scratch(ops);
-  ops.m_deserialise(m_archive, scratch.m_value, 0, 1);
-  if (mentions) NoteMentioned(known);
-  return m_archive.m_position;
+// What was made is destroyed ahead of the objects that it refers to.
+template <typename Read>
+ArchiveWalker::Extent ArchiveWalker::Probe(Read read) {
+  const Mark mark = Here();
+  const FirstObjects objects(m_archive.m_objects, mark.m_objects, m_isInReference);
+  read();
+  const Extent extent = {m_archive.m_position, ObjectsFrom(mark.m_objects), m_archive.m_releases};
+  GoBack(mark);
+  return extent;
 }
 
-void ArchiveWalker::NoteMentioned(std::size_t first) {
+ArchiveWalker::Extent ArchiveWalker::ProbeValue(TypeOps const& ops) {
+  return Probe([this, &ops] {
+    const Scratch scratch(ops);
+    ops.m_deserialise(m_archive, scratch.m_value, 0, 1);
+  });
+}
+
+// A class without a model has no operations of archives, though it be an object that has them.
+ArchiveWalker::Extent ArchiveWalker::ProbeClass(ReflectedClass const& record) {
+  if (record.m_ops.m_deserialise || !record.m_create) return ProbeValue(record.m_ops);
+  return Probe([this, &record] {
+    struct Made {
+      ~Made() {
+        m_object.m_forget(m_object);
+        m_object.m_destroy(m_object);
+      }
+      NumberedObject m_object;
+    } made{MakePersistable(record)};
+    made.m_object.m_read(m_archive, made.m_object);
+  });
+}
+
+// As far as they were read.
+xvector<ArchivedObject> ArchiveWalker::ObjectsFrom(std::size_t first) {
+  xvector<ArchivedObject> objects;
   auto const& list = m_archive.m_objects.m_list;
   for (std::size_t i = first; i < list.size(); ++i) {
     ReflectedClass const* record = ClassOf(ptr<IPersistable>(list[i].m_persistable));
-    m_content.m_objects.push_back({record ? &m_content.m_types.Of(*record) : nullptr, kNoNode, list[i].m_isRead});
+    objects.push_back({record ? &m_content.m_types.Of(*record) : nullptr, kNoNode, list[i].m_isRead});
   }
+  return objects;
 }
 
 template <typename Read>

@@ -97,7 +97,7 @@ xstring ReferenceText(ArchiveNode const& node) {
 xstring ReleaseText(ArchiveView::Content const& content, ArchiveNode const& node) {
   const uint32 release = CompactAt(content.BytesOf(node));
   return TextOf([&](xostream& os) {
-    os << "release " << release;
+    os << release;
     if (node.m_label) os << " of " << node.m_label;
     if (node.m_detail == kNoNode) {
       os << " of a project that is not here";
@@ -135,7 +135,7 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
     case AP_MARK:
       return vxMakeString("objects, form " << int32(bytes[3]));
     case AP_COUNT:
-      return vxMakeString(CompactAt(bytes) << ' ' << (node.m_label ? node.m_label : "elements"));
+      return vxMakeString(CompactAt(bytes) << (node.m_label ? " " : "") << (node.m_label ? node.m_label : ""));
     case AP_NAME:
       return QuotedText(bytes + SizeOfCompact(*bytes), CompactAt(bytes), content.m_options.m_text);
     case AP_RELEASE:
@@ -143,11 +143,11 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
     case AP_REFERENCE:
       return ReferenceText(node);
     case AP_TAG:
-      return vxMakeString("item " << CompactAt(bytes) << ", " << node.m_label);
+      return vxMakeString(CompactAt(bytes) << ", " << node.m_label);
     case AP_VALUE:
       return ArchiveValueText(content, *node.m_type, bytes);
     case AP_BYTES:
-      return vxMakeString(node.m_size << " bytes, read by code of their own");
+      return vxMakeString(node.m_size << " bytes that only the class knows");
     case AP_REST:
       return vxMakeString(node.m_size << " bytes" << (content.m_error.empty() ? ", more than is shown" : ", not read"));
     case AP_GROUP:
@@ -156,9 +156,44 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
   return xstring();
 }
 
+xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node) {
+  ArchiveNode const& of = content.m_nodes[node];
+  if (of.m_kind != AP_GROUP) {
+    return of.m_isBlock ? vxMakeString(of.m_size / of.m_type->m_size << " elements") : ArchiveNodeText(content, of);
+  }
+  ArchiveNode const* const first = node + 1 < of.m_end ? &content.m_nodes[node + 1] : nullptr;
+  if (first && first->m_kind == AP_COUNT) return ArchiveNodeText(content, *first) + " elements";
+  if (first && (first->m_kind == AP_TAG || first->m_kind == AP_NAME)) {
+    xstring held;
+    if (node + 2 < of.m_end) held = ' ' + ArchiveShortText(content, node + 2);
+    return (first->m_kind == AP_TAG ? xstring(first->m_label) : ArchiveNodeText(content, *first)) + held;
+  }
+  return of.m_type ? of.m_type->m_text : xstring();
+}
+
 // --- Parts
 
 namespace {
+
+// Its type, where it has one.
+xstring WhatOf(ArchiveNode const& node) {
+  static constexpr ConstStringZ names[] = {"project", "class", "type"};
+  switch (node.m_kind) {
+    case AP_MARK:
+      return "head";
+    case AP_COUNT:
+      return "count";
+    case AP_NAME:
+      return names[node.m_detail];
+    case AP_RELEASE:
+      return "release";
+    case AP_TAG:
+      return "tag";
+    default:
+      if (!node.m_type) return xstring();
+      return node.m_step == EPathStep::Key ? xstring(node.m_type->m_text + ", key") : node.m_type->m_text;
+  }
+}
 
 ArchivePart PartOf(ArchiveView::Content const& content, uint32 index, std::size_t part) {
   ArchiveNode const& node = content.m_nodes[index];
@@ -168,7 +203,7 @@ ArchivePart PartOf(ArchiveView::Content const& content, uint32 index, std::size_
   shown.m_size = node.m_size;
   for (uint32 at = node.m_parent; at != kNoNode; at = content.m_nodes[at].m_parent) ++shown.m_depth;
   shown.m_path = ArchivePathText(content, index);
-  if (node.m_type) shown.m_type = node.m_type->m_text;
+  shown.m_type = WhatOf(node);
   if (!node.m_isBlock) {
     shown.m_value = ArchiveNodeText(content, node);
     return shown;
@@ -288,6 +323,7 @@ ArchiveView::ArchiveView(xvector<octet_t> bytes, ArchiveOptions const& options)
 ArchiveView::ArchiveView(ReflectedType const& type, TypeOps const& ops, xvector<octet_t> bytes,
                          ArchiveOptions const& options)
     : m_content(std::make_unique<Content>(std::move(bytes), options)) {
+  m_content->m_declared = type;
   m_content->m_type = &m_content->m_types.Of(type);
   m_content->m_ops = &ops;
   ArchiveWalker(*m_content).Value();

@@ -139,34 +139,19 @@ xstring ArchiveWalker::TakeText() {
 void ArchiveWalker::WalkClass(ValueType const& type, Step step) {
   const ReadingScope scope(m_archive);
   if (StackLeft() < kLeastStack) FailArchive("values nested too deeply in an archive");
-  if (!m_isChecked || m_checkable == 0) return WalkUnchecked(type, step);
-  const Mark mark = Here();
-  std::size_t end = 0;
-  try {
-    end = Probe(*type.m_ops, false);
-  } catch (std::exception const&) {
-  }
-  GoBack(mark);
-  if (end == 0) return WalkUnchecked(type, step);
-  m_checkable -= std::min(m_checkable, end - mark.m_position);
-  try {
-    WalkUnchecked(type, step);
-    if (m_archive.m_position == end) return;
-  } catch (ArchiveError const&) {
-  }
-  GoBack(mark);
-  const Group group(*this, &type, step);
-  WalkBytes(*type.m_ops);
+  WalkOpened(type, step);
 }
 
-void ArchiveWalker::WalkUnchecked(ValueType const& type, Step step) {
+void ArchiveWalker::WalkOpened(ValueType const& type, Step step) {
   const Group group(*this, &type, step);
   Layout const& layout = LayoutOf(*type.m_class);
-  if (!layout.m_isKnown) return WalkBytes(*type.m_ops);
-  WalkFields(layout);
+  if (!layout.m_isKnown) return WalkBytes(ProbeClass(*type.m_class), m_content.m_objects.size());
+  WalkFields(layout, layout.m_isOpen ? ProbeClass(*type.m_class) : Extent());
 }
 
-void ArchiveWalker::WalkFields(Layout const& layout) {
+// What stands behind a field without a record is not known: it takes up the rest of the extent.
+void ArchiveWalker::WalkFields(Layout const& layout, Extent const& extent) {
+  const std::size_t firstMentioned = m_content.m_objects.size();
   if (layout.m_hasRelease) {
     const std::size_t position = m_archive.m_position;
     ReadCompact(m_archive);
@@ -176,7 +161,10 @@ void ArchiveWalker::WalkFields(Layout const& layout) {
   }
   const RSN release = layout.m_asksRelease ? ReleaseBeingRead(*layout.m_modelTarget) : layout.m_first;
   for (auto const& [field, type] : layout.m_fields) {
-    if (layout.IsIn(*field, release)) Walk(*type, {EPathStep::Field, field->m_name, 0});
+    if (!layout.IsIn(*field, release)) continue;
+    const Step step = {EPathStep::Field, field->m_name, 0};
+    if (type->m_kind == VK_NONE) return WalkBytes(extent, firstMentioned, step);
+    Walk(*type, step);
   }
 }
 
@@ -185,9 +173,17 @@ void ArchiveWalker::AddRelease(XTarget const* target) {
   if (node) node->m_detail = target ? static_cast<uint32>(target->m_rsn) : kNoNode;
 }
 
-void ArchiveWalker::WalkBytes(TypeOps const& ops) {
-  Probe(ops, true);
-  AddLeaf(AP_BYTES);
+// To the end of an extent, some of whose objects may have been walked.
+void ArchiveWalker::WalkBytes(Extent const& extent, std::size_t firstMentioned, Step step) {
+  auto& objects = m_content.m_objects;
+  if (m_archive.m_position > extent.m_end || objects.size() - firstMentioned > extent.m_mentioned.size()) {
+    FailArchive("not laid out as its record tells");
+  }
+  m_archive.m_position = extent.m_end;
+  m_archive.m_releases = extent.m_releases;
+  if (m_covered < extent.m_end) AddLeaf(AP_BYTES, nullptr, step);
+  const std::size_t walked = objects.size() - firstMentioned;
+  objects.insert(objects.end(), extent.m_mentioned.begin() + walked, extent.m_mentioned.end());
 }
 
 // --- Containers
@@ -216,7 +212,7 @@ void ArchiveWalker::WalkEntries(ValueType const& type, std::size_t count) {
     const uint32 number = static_cast<uint32>(i);
     if (type.m_key) {
       const Group entry(*this, nullptr, {EPathStep::Entry, nullptr, number});
-      Walk(*type.m_key, Step());
+      Walk(*type.m_key, {EPathStep::Key, nullptr, 0});
       Walk(*type.m_item, Step());
     } else {
       Walk(*type.m_item, {EPathStep::Element, nullptr, number});
@@ -242,7 +238,7 @@ void ArchiveWalker::WalkVariant(ValueType const& type, Step step) {
   if (item && item->m_code == RC_VOID) return;
   if (item && item->m_kind != VK_NONE) return Walk(*item, {EPathStep::Field, name, 0});
   m_archive.m_position = begin;
-  WalkBytes(*type.m_ops);
+  WalkBytes(ProbeValue(*type.m_ops), m_content.m_objects.size());
 }
 
 void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
@@ -251,12 +247,16 @@ void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
   const Group group(*this, &type, step);
   const std::size_t begin = m_archive.m_position;
   const xstring name = TakeText();
-  AddLeaf(AP_NAME);
+  AddName(AN_TYPE);
   m_archive.m_position = begin;
   TypeOps const* const ops = AnyValue::ReadType(m_archive);
   if (!ops) return;
   if (ValueType const* held = JsonTypeOfName(m_content.m_types, name)) return Walk(*held, Step());
-  WalkBytes(*ops);
+  const std::size_t position = m_archive.m_position;
+  m_archive.m_position = begin;
+  const Extent extent = ProbeValue(GetTypeOps<openvariant<int32>>());
+  m_archive.m_position = position;
+  WalkBytes(extent, m_content.m_objects.size());
 }
 
 // --- References
@@ -274,7 +274,7 @@ void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
   if (known >= m_archive.m_limits.m_objects) FailArchive("too many objects in an archive");
   ReflectedClass const* const target = type.m_code == RC_CREF ? Find<ReflectedClass>(type.m_target) : nullptr;
   if (type.m_code == RC_PREF || (target && target->m_objectTable)) {
-    objects.push_back({WalkClassName(), kNoNode, false});
+    objects.push_back({WalkClassName(step), kNoNode, false});
   } else {
     objects.push_back({target ? &m_content.m_types.Of(*target) : nullptr, kNoNode, false});
   }
@@ -286,9 +286,13 @@ void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
   }
 }
 
-ValueType const* ArchiveWalker::WalkClassName() {
+void ArchiveWalker::AddName(EArchiveName what, Step step) {
+  if (ArchiveNode* node = AddLeaf(AP_NAME, nullptr, step)) node->m_detail = what;
+}
+
+ValueType const* ArchiveWalker::WalkClassName(Step step) {
   const xstring name = TakeText();
-  AddLeaf(AP_NAME);
+  AddName(AN_CLASS, step);
   ReflectedClass const* const record = Find<ReflectedClass>(name);
   if (!record) throw ArchiveError(NotRegistered("class", name));
   auto const& allow = m_archive.m_objects.m_allow;
@@ -304,7 +308,8 @@ void ArchiveWalker::WalkContent(std::size_t object) {
   const Step step = {EPathStep::Object, nullptr, static_cast<uint32>(object + 1)};
   m_content.m_objects[object].m_node = static_cast<uint32>(m_content.m_nodes.size());
   if (!type) throw ArchiveError("what stands there is not known");
-  if (type->m_class->m_objectTable) return WalkUnchecked(*type, step);
+  const ArchiveScope scope(m_archive);
+  if (type->m_class->m_objectTable) return WalkOpened(*type, step);
   WalkClass(*type, step);
 }
 
@@ -313,27 +318,16 @@ void ArchiveWalker::WalkContent(std::size_t object) {
 // The walk has to end where that ended which was read ahead; if it cannot, the bytes are shown as they are.
 template <typename Action>
 void ArchiveWalker::WalkAsRead(ValueType const* type, Step step, Action walk) {
-  const std::size_t end = m_end;
-  const ReleaseList releases = m_releasesAtEnd;
+  const Extent extent = {m_end, ObjectsFrom(m_content.m_objects.size()), m_releasesAtEnd};
   const Mark mark = Here();
-  m_checkable = 8 * m_archive.m_bytes.size() + 4096;
-  for (bool isChecked : {false, true}) {
-    m_isChecked = isChecked;
-    try {
-      walk();
-      if (m_archive.m_position == end) break;
-    } catch (ArchiveError const&) {
-    }
-    GoBack(mark);
+  try {
+    walk();
+    if (m_archive.m_position == extent.m_end) return;
+  } catch (ArchiveError const&) {
   }
-  m_isChecked = false;
-  if (m_archive.m_position != end) {
-    const Group group(*this, type, step);
-    m_archive.m_position = end;
-    AddLeaf(AP_BYTES);
-    NoteMentioned(mark.m_objects);
-  }
-  m_archive.m_releases = releases;
+  GoBack(mark);
+  const Group group(*this, type, step);
+  WalkBytes(extent, mark.m_objects);
 }
 
 void ArchiveWalker::Head() {
@@ -359,10 +353,10 @@ void ArchiveWalker::Head() {
 void ArchiveWalker::HeadReleases(bool occurs) {
   const xvector<XTarget const*> targets = AllTargets();
   std::size_t count = ReadCount(m_archive, 2);
-  AddLeaf(AP_COUNT, nullptr, {EPathStep::None, occurs ? "projects whose models occur" : "other projects", 0});
+  AddLeaf(AP_COUNT, nullptr, {EPathStep::None, occurs ? "whose models occur" : "others", 0});
   for (; count > 0; --count) {
     const xstring name = TakeText();
-    AddLeaf(AP_NAME);
+    AddName(AN_PROJECT);
     const RSN release = ReadCompact(m_archive);
     const auto target =
         std::find_if(targets.begin(), targets.end(), [&name](XTarget const* t) { return name == t->m_name; });
@@ -374,6 +368,7 @@ void ArchiveWalker::HeadReleases(bool occurs) {
 
 void ArchiveWalker::Objects() {
   try {
+    if (!m_content.m_error.empty()) return Finish();
     Head();
     m_isInReference = m_archive.m_objects.m_isReading = true;
     ReadRoot();
@@ -400,6 +395,7 @@ void ArchiveWalker::Value() {
   ValueType const& type = *m_content.m_type;
   TypeOps const& ops = *m_content.m_ops;
   try {
+    if (!m_content.m_error.empty()) return Finish();
     ReadAhead([this, &ops] {
       auto scratch = std::make_unique<Scratch>(ops);
       m_content.m_value = scratch->m_value;

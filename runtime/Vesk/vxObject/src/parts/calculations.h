@@ -103,23 +103,23 @@ void GraphState::LookAtInputs(DGNode const& outermost) {
 }
 
 inline void GraphState::Calculate(DGNode const& node) {
-  if (node.m_isCalculating || node.m_unwound || m_rest) return CalculateChecked(node);
-  CalculateNow(node);
-}
-inline void GraphState::CalculateNow(DGNode const& node) {
+  if ((node.m_isCalculating || node.m_unwound || m_rest) && CalculateWatched(node)) return;
   if (IsDeep()) return CalculateElsewhere(node);
   CalculateHere(node);
 }
-void GraphState::CalculateChecked(DGNode const& node) {
-  CheckCalculation(node);
-  Timing timing(*this, node);
-  CalculateNow(node);
-  timing.Succeed();
-}
-void GraphState::CheckCalculation(DGNode const& node) const {
+// What is seldom to be looked at. Answers whether a GraphWatch had it calculated.
+bool GraphState::CalculateWatched(DGNode const& node) {
   if (node.m_isCalculating) throw GraphError("cyclic dependency: " + node.Name());
   if (m_rest) m_rest->RethrowErrorOf(node);
   if (IsWaiting(node)) throw GraphError("cyclic dependency: " + node.Name());
+  if (!m_rest || !m_rest->m_watched) return false;
+  CalculateTimed(node);
+  return true;
+}
+void GraphState::CalculateTimed(DGNode const& node) {
+  Timing timing(*this, node);
+  IsDeep() ? CalculateElsewhere(node) : CalculateHere(node);
+  timing.Succeed();
 }
 
 void GraphState::CalculateHere(DGNode const& node) {

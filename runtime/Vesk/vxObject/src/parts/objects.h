@@ -144,11 +144,13 @@ EMention ReadMention(InputArchive& ar, std::size_t& number) {
   return hasContent ? EMention::NewWithContent : EMention::New;
 }
 
+// An object is not read by `>>`, but what its model asks for is asked of this archive all the same.
 void ReadContent(InputArchive& ar, std::size_t position) {
   if (ar.m_objects.m_list[position].m_isRead) return;
   if (StackLeft() < LeastStackForContent) throw ArchiveError("objects nested too deeply in an archive");
   ar.m_objects.m_list[position].m_isRead = true;
   const auto object = ar.m_objects.m_list[position];
+  const ArchiveScope scope(ar);
   object.m_read(ar, object);
 }
 
@@ -171,11 +173,15 @@ NumberedObject MakePersistable(InputArchive& ar, std::function<bool(ReflectedCla
     throw ArchiveError("not the class of the reference: " + name);
   }
   if (ar.m_objects.m_allow && !ar.m_objects.m_allow(*record)) throw ArchiveError("class is not allowed: " + name);
-  const ptr<IObject> whole = record->m_create();
+  return MakePersistable(*record);
+}
+
+NumberedObject MakePersistable(ReflectedClass const& record) {
+  const ptr<IObject> whole = record.m_create();
   const ptr<IPersistable> made = QueryInterface<IPersistable>(whole);
   if (!made) {
     whole->DestroyObject();
-    throw ArchiveError("not persistable: " + name);
+    throw ArchiveError(vxMakeString("not persistable: " << record.m_name));
   }
   NumberedObject object;
   object.m_self = made.Object();

@@ -239,6 +239,10 @@ ROW(Projects) {
     // The model that a class references.
     Refers refers;
     CHECK(vesk::WriteObject(vesk::ptr<IDoc>(&refers))[4], 2);
+    const vesk::ptr<IDoc> old = vesk::ReadObject<IDoc>(
+        {0xFF, 'v', 'x', 2, 1, 5, 'k', 'i', 'n', 'd', 's', 1, 0, 2, 6, 'R', 'e', 'f', 'e', 'r', 's', 1, 20, 0, 0, 0, 7, 0, 0, 0});
+    CHECK(*static_cast<Refers*>(old.Object()), "Size(20,7,Green,High)");
+    old->DestroyObject();
 
     // What nobody could read is not written.
     vesk::XTarget& kinds = *vesk::kinds_GetXTarget();
