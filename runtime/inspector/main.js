@@ -90,7 +90,7 @@ const changes = {
     this.body = make('tbody');
     panel.append(make('div', { className: 'pad' }, this.note, make('div', { className: 'scroll' }, make('table', {}, make('thead', {}, make('tr', {},
       ...['Time', 'Class', 'Field', 'Change', 'Times'].map(head => make('th', { scope: 'col' }, head)))), this.body))));
-    link.on('push', ({ log }) => log && this.add(log));
+    link.on('push', ({ logs }) => (logs || []).forEach(log => this.add(log)));
   },
   add({ total, items }) {
     this.total += total;

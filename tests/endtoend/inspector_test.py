@@ -109,7 +109,7 @@ def test_telling(program):
         assert 10 <= len(told) <= 60, f"{len(told)} messages in two seconds"
         ranges = [each for message in told for each in message.get("ranges", [])]
         assert sum(each["path"] == ["shop"] for each in ranges) == 1, ranges
-        logs = [message["log"] for message in told if "log" in message]
+        logs = [log for message in told for log in message.get("logs", [])]
         assert sum(log["total"] for log in logs) > 1000, logs[:3]
         equal({(item["what"], item["path"], item["kind"]) for log in logs for item in log["items"]}, {("shop::Item", "price", "assign")})
         other.ask("find", text="SECOND")

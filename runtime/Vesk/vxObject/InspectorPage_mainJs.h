@@ -90,7 +90,7 @@ constexpr std::string_view kInspectorMainJs =
     "    this.body = make('tbody');\n"
     "    panel.append(make('div', { className: 'pad' }, this.note, make('div', { className: 'scroll' }, make('table', {}, make('thead', {}, make('tr', {},\n"
     "      ...['Time', 'Class', 'Field', 'Change', 'Times'].map(head => make('th', { scope: 'col' }, head)))), this.body))));\n"
-    "    link.on('push', ({ log }) => log && this.add(log));\n"
+    "    link.on('push', ({ logs }) => (logs || []).forEach(log => this.add(log)));\n"
     "  },\n"
     "  add({ total, items }) {\n"
     "    this.total += total;\n"

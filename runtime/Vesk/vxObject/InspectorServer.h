@@ -308,20 +308,23 @@ class InspectorServer {
   void Tick() {
     m_shared.m_log.Listen(m_pages > 0);
     if (m_pages == 0) m_shared.m_graph.Forget();
-    xvector<std::shared_ptr<Connection>> due;
+    xvector<std::shared_ptr<Connection>> open, due;
     for (Connection* connection : m_connections) {
-      InspectorSession* const session = connection->Session();
-      if (session && connection->IsReading() && session->IsTime()) due.push_back(connection->shared_from_this());
+      if (!connection->Session()) continue;
+      open.push_back(connection->shared_from_this());
+      if (connection->IsReading() && connection->Session()->IsTime()) due.push_back(open.back());
     }
     if (due.empty()) return;
-    xstring log;
     if (!m_shared.m_log.IsEmpty()) {
       InspectorWriter out;
       out.Open('{');
       m_shared.m_log.Put(out);
-      log = out.Close('}').Take();
+      const xstring log = out.Close('}').Take();
+      for (auto const& connection : open) connection->Session()->Hear(log);
     }
-    for (auto const& connection : due) connection->Session()->Tick(log);
+    for (auto const& connection : due) {
+      if (connection->Session()) connection->Session()->Tick();
+    }
   }
 
   InspectorShared& m_shared;

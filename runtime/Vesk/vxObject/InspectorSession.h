@@ -77,29 +77,42 @@ class InspectorSession {
     m_send(out.Close('}').Take());
   }
 
-  // Tells what has changed, when it is time to; `log` is what hooks told, for all pages.
-  bool IsTime() const { return Clock::now() >= m_next; }
-  void Tick(xstring const& log) {
+  // What hooks told, for the next message.
+  void Hear(xstring const& log) {
+    if (m_log.size() >= kMostText) return;
+    if (!m_log.empty()) m_log += ',';
+    m_log += log;
+  }
+
+  // Tells what has changed, when it is time to, and goes on with a search.
+  bool IsTime() const { return Clock::now() >= (m_search.IsDone() ? m_next : std::min(m_next, m_nextSlice)); }
+  void Tick() {
+    if (!m_search.IsDone() && Clock::now() >= m_nextSlice) {
+      m_search.Go(m_shared.m_tree, Clock::now() + kSlice);
+      m_nextSlice = Clock::now() + 2 * kSlice;
+    }
     const auto begin = Clock::now();
+    if (begin < m_next) return;
     InspectorWriter out;
     out.Open('{').Member("push", "changes");
     const std::size_t empty = out.Size();
     PutRanges(out);
-    if (!log.empty()) out.Name("log").Raw(log);
+    if (!m_log.empty()) out.Name("logs").Open('[').Raw(std::exchange(m_log, xstring())).Close(']');
     PutUndo(out);
-    if (!m_search.IsDone()) {
+    if (m_search.HasNews()) {
       out.Name("found").Open('{');
-      m_search.Go(m_shared.m_tree, Clock::now() + std::chrono::milliseconds(10), out);
+      m_search.Put(out);
       out.Close('}');
     }
     if (out.Size() > empty) m_send(out.Close('}').Take());
     // What takes long is done less often: a twentieth of the program's time is the page's.
     const auto now = Clock::now();
     m_next = now + std::max<Clock::duration>(std::chrono::milliseconds(1000 / kMostMessages), 20 * (now - begin));
-    if (!m_search.IsDone()) m_next = now + std::chrono::milliseconds(1000 / kMostMessages);
   }
 
  private:
+  static constexpr std::chrono::milliseconds kSlice{10};
+
   typedef void (InspectorSession::*Handler)(InspectorWriter& out, InspectorJson const& message);
   struct Request {
     std::string_view m_name;
@@ -335,7 +348,8 @@ class InspectorSession {
 
   InspectorShared& m_shared;
   SendFunction m_send;
-  Clock::time_point m_next;
+  Clock::time_point m_next, m_nextSlice;  // of a message, of a search
+  xstring m_log;                          // what hooks told since the last message
   xvector<Range> m_ranges;
   InspectorSearch m_search;
   InspectorArchives m_archives;
