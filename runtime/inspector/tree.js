@@ -118,7 +118,8 @@ const tree = {
     }
     const isOther = keyOf(kid.row.step) !== keyOf(row.step);
     if (isOther) this.close(kid);
-    kid.changed = isOther ? 0 : performance.now();
+    const isSame = keyOf(kid.row) === keyOf(row);
+    kid.changed = isOther || isSame ? kid.changed : performance.now();
     kid.take(row);
     if (kid.open) this.nodes.set(kid.key, kid);
     if (kid.open && !kid.count) this.close(kid);

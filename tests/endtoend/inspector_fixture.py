@@ -4,11 +4,10 @@ import base64
 import json
 import os
 import select
-import shutil
 import socket
 import struct
 import subprocess
-from pathlib import Path
+import time
 
 from runtime_fixture import link, translated_shop, write_library
 from workspace_fixture import ROOT, Skipped, need
@@ -134,7 +133,6 @@ class Page:
 
     def arrives(self, seconds):
         """What comes within a time by itself."""
-        import time
         end = time.monotonic() + seconds
         messages, self.pushed = self.pushed, []
         while self.buffer or select.select([self.socket], [], [], max(end - time.monotonic(), 0))[0]:

@@ -5,6 +5,7 @@ import functools
 import json
 import random
 import re
+import subprocess
 import time
 
 from browser_fixture import Browser, with_selenium
@@ -348,7 +349,7 @@ def test_looks(binary):
 def test_new_workspace(binary):
     """The five lines of docs/inspector.md in the workspace that `Qrex --init` lays out."""
     page = (ROOT / "docs/inspector.md").read_text()
-    lines = re.search(r"<!-- first -->\n+((?:    .*\n)+)", page).group(1)
+    lines = re.search(r"<!-- first -->\n((?:(?:    .*)?\n)+)", page).group(1)
     head, *body = [line.strip() for line in lines.splitlines() if line.strip() and not line.strip().startswith("//")]
     with Workspace(binary, {}) as workspace:
         workspace.shell("Qrex --init zoo")
@@ -357,7 +358,6 @@ def test_new_workspace(binary):
         text = workspace.path(source).read_text()
         workspace.path(source).write_text(text[:text.rindex("}")] + "\n".join(body) + "\n}\n")
         workspace.shell("cd zoo && Qrex zoo.qrex")
-        import subprocess
         process = subprocess.Popen([workspace.path("zoo/out/lib/x64/Debug/zoo_app")], stdout=subprocess.PIPE, text=True)
         try:
             address = next(line for line in process.stdout if line.startswith("Inspector: ")).split()[-1]

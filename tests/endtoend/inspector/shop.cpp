@@ -1,4 +1,5 @@
-// A shop that is looked into: app loop|serve|count|end. It prints the address, then what it was told to.
+// A shop that is looked into: app loop|busy|readonly|serve|archives, or count N. It prints the address, and at its end what came
+// of it.
 
 @import "Vesk/vxObject/Inspector.h"
 @import "app/src/shop.h"
@@ -73,7 +74,8 @@ int main(int argc, char** argv)
     inspector.AllowChanges(mode != "readonly");
     if (mode == "count")  // what Poll costs while nobody looks
     {
-        for (int i = 0; i < 1000000; ++i) inspector.Poll();
+        inspector.Listen();
+        for (int i = std::atoi(argv[2]); i > 0; --i) inspector.Poll();
         return 0;
     }
     inspector.Limits().m_time = std::chrono::milliseconds(1500);
