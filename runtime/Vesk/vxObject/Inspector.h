@@ -10,15 +10,16 @@
 //   inspector.Serve(8000);                      // prints the address, and is the loop
 //
 // There is no thread behind it: an object is read, changed and called within Poll or Serve alone, by the thread that
-// calls them. That is always the same one, and the one whose graph and hooks are shown; only Stop may come from another.
-// What is shown must live until it is hidden, and so must what it refers to. Between two calls of Poll the program may do
-// with it what it likes. A Poll within a method that the page calls does nothing.
+// calls them. That is always the same one, and the one whose graph and hooks are shown; only Stop may come from
+// another. What is shown must live until it is hidden, and so must what it refers to. Between two calls of Poll the
+// program may do with it what it likes. A Poll within a method that the page calls does nothing.
 //
 // While nobody looks, Poll reads the clock, and looks at its sockets a hundred times a second at most; no hook is set.
 //
 // The page reads. Changes and calls are for programs that say so: inspector.AllowChanges().
 //
-// It needs Boost.Beast (Debian's libboost-dev, headers alone), and nothing else includes it. Programs link with -pthread.
+// It needs Boost.Beast (Debian's libboost-dev, headers alone), and nothing else includes it. Programs link with
+// -pthread.
 
 @import "Vesk/vxObject/InspectorPage.h"
 @import "Vesk/vxObject/InspectorServer.h"
@@ -77,7 +78,8 @@ class Inspector {
     m_next = now + (m_server.Pages() > 0 ? kPauseOfPages : kPause);
   }
   // Listens, prints the address, and serves until Stop or until `isDone`, which is asked ten times a second.
-  void Serve(uint16 port = 0, std::function<bool()> const& isDone = [] { return false; }) {
+  void Serve(
+      uint16 port = 0, std::function<bool()> const& isDone = [] { return false; }) {
     const xstring address = Listen(port);
     xout() << "Inspector: " << address << '\n';
     xout().Target().flush();

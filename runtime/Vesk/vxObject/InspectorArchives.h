@@ -1,6 +1,7 @@
-// Archives that are dropped on the page: their bytes part by part, what was read of them, the release that wrote them, what
-// `$evolve` made of them, and how the second differs from the first. Reading one makes objects of registered classes, as
-// ReadObject does: docs/trust.md says what that may do.
+// Archives that are dropped on the page: their bytes part by part, what was read of them, the release that wrote them,
+// what
+// `$evolve` made of them, and how the second differs from the first. Reading one makes objects of registered classes,
+// as ReadObject does: docs/trust.md says what that may do.
 
 @import "Vesk/vxObject/DumpArchive.h"
 @import "Vesk/vxObject/InspectorJson.h"
@@ -21,7 +22,8 @@ class InspectorArchives {
     options.m_changes = 1000;
     options.m_limits.m_objects = 1 << 20;
     xvector<octet_t> copy(bytes.begin(), bytes.end());
-    view.emplace(type.empty() ? ArchiveView(std::move(copy), options) : ArchiveView::OfType(type, std::move(copy), options));
+    view.emplace(type.empty() ? ArchiveView(std::move(copy), options)
+                              : ArchiveView::OfType(type, std::move(copy), options));
     out.Member("size", view->Bytes().size()).Member("class", view->Class()).Member("parts", view->CountParts());
     if (!view->Error().empty()) out.Member("error", view->Error());
     out.Name("releases").Open('[');

@@ -85,7 +85,8 @@ class InspectorCalls {
     for (ssize_t i = 0; i < record.m_numMethods; ++i) {
       ReflectedClassMethod const& method = record.m_methods[i];
       out.Open('{').Member("name", method.m_name);
-      out.Member("result", method.m_return.m_type ? TypeText({method.m_return.m_type, record.m_strings}) : xstring("void"));
+      out.Member("result",
+                 method.m_return.m_type ? TypeText({method.m_return.m_type, record.m_strings}) : xstring("void"));
       out.Name("args").Open('[');
       for (ssize_t k = 0; k < method.m_numArgs; ++k) PutArgument(out, types, record, method.m_args[k]);
       out.Close(']').Member("const", method.m_isConst);
@@ -152,7 +153,8 @@ class InspectorCalls {
   }
 
   static InspectorArgument Made(std::shared_ptr<ValueTypes> const& types, ReflectedClass const& record,
-                                ReflectedArg const& argument, InspectorJson const& json, std::list<InspectorCopy>& held) {
+                                ReflectedArg const& argument, InspectorJson const& json,
+                                std::list<InspectorCopy>& held) {
     const ReflectedType declared = DecodeType({argument.m_type, record.m_strings});
     const InspectorPassing passing(declared);
     ValueType const& type = types->Of(passing.m_type);
@@ -186,7 +188,8 @@ class InspectorCalls {
   }
   // As wide as a register, with the sign.
   static int64 Whole(ValueType const& type, void const* address) {
-    const bool isSigned = type.m_kind == VK_INT || type.m_kind == VK_ENUM || (type.m_kind == VK_CHAR && type.m_size == 1);
+    const bool isSigned =
+        type.m_kind == VK_INT || type.m_kind == VK_ENUM || (type.m_kind == VK_CHAR && type.m_size == 1);
     switch (type.m_size) {
       case 1:
         return isSigned ? *static_cast<int8 const*>(address) : *static_cast<uint8 const*>(address);
@@ -249,8 +252,9 @@ class InspectorCalls {
     out.Close('}');
   }
   // Those that are not const.
-  static void PutReferences(InspectorWriter& out, std::shared_ptr<ValueTypes> const& types, ReflectedClass const& record,
-                            ReflectedClassMethod const& method, std::list<InspectorCopy> const& held) {
+  static void PutReferences(InspectorWriter& out, std::shared_ptr<ValueTypes> const& types,
+                            ReflectedClass const& record, ReflectedClassMethod const& method,
+                            std::list<InspectorCopy> const& held) {
     out.Name("out").Open('[');
     auto at = held.begin();
     for (ssize_t i = 0; i < method.m_numArgs; ++i, ++at) {

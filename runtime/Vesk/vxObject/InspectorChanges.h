@@ -2,9 +2,9 @@
 // refuse it by throwing; models, `$indep` fields and what depends on them hear of it. It is checked whole before
 // anything changes: the text by the reader of JSON, the number against the range in the metadata.
 //
-// What is kept of a change is a copy of the value before and after it, or of the element that came or went. It is undone
-// while what it made is still there: not when the program has changed the place meanwhile. References are not changed:
-// a copy might outlive what it refers to. Lists of them are only put in another order.
+// What is kept of a change is a copy of the value before and after it, or of the element that came or went. It is
+// undone while what it made is still there: not when the program has changed the place meanwhile. References are not
+// changed: a copy might outlive what it refers to. Lists of them are only put in another order.
 
 @import "Vesk/vxObject/InspectorRows.h"
 
@@ -46,8 +46,8 @@ class InspectorCopy {
   HeldValue m_held;
 };
 
-// InspectorError unless the numbers in a value are what the metadata allow: its own, for the fields of a class theirs, and
-// for the elements of a container what is said of it.
+// InspectorError unless the numbers in a value are what the metadata allow: its own, for the fields of a class theirs,
+// and for the elements of a container what is said of it.
 inline void CheckInspectorRange(Value const& value, xvector<MetadataValue> const& metadata) {
   const EValueKind kind = value.Kind();
   if (kind == VK_CLASS || kind == VK_LIST || kind == VK_SET || kind == VK_MAP) {
@@ -102,9 +102,8 @@ class InspectorChanges {
     element.m_declared = InspectorInner(place.m_declared);
     if (element.m_declared.m_metadata.empty()) element.m_declared.m_metadata = place.m_declared.m_metadata;
     element.m_value = place.m_value;
-    change.m_after = json.m_kind == InspectorJson::Null
-                         ? std::make_shared<InspectorCopy>(place.m_value.Types(), item)
-                         : Made(element, item, json);
+    change.m_after = json.m_kind == InspectorJson::Null ? std::make_shared<InspectorCopy>(place.m_value.Types(), item)
+                                                        : Made(element, item, json);
     Do(std::move(change));
   }
   void Remove(InspectorJson const& path, ssize_t at) {
@@ -132,7 +131,8 @@ class InspectorChanges {
  private:
   struct Change {
     enum EKind { Set, Insert, Remove, Move };
-    Change(EKind kind, InspectorJson const& path, xstring const& name) : m_kind(kind), m_path(path.m_raw), m_name(name) {}
+    Change(EKind kind, InspectorJson const& path, xstring const& name)
+        : m_kind(kind), m_path(path.m_raw), m_name(name) {}
     xstring Text() const {
       constexpr ConstStringZ kVerbs[] = {"set ", "add to ", "remove from ", "move in "};
       return kVerbs[m_kind] + m_name;
@@ -216,8 +216,7 @@ class InspectorChanges {
   static void PutIn(Value const& list, ssize_t at, InspectorCopy const& element) {
     const ssize_t count = list.Count();
     CheckPosition(at, count + 1);
-    Rebuild(list, count + 1, &element, at,
-            [at](ssize_t position) { return position < at ? position : position - 1; });
+    Rebuild(list, count + 1, &element, at, [at](ssize_t position) { return position < at ? position : position - 1; });
   }
   static void TakeOut(Value const& list, ssize_t at, InspectorCopy const& element) {
     const ssize_t count = list.Count();
@@ -244,7 +243,8 @@ class InspectorChanges {
     if (type.m_code == RC_VECTOR && type.m_item->m_kind == VK_BOOL) {
       xvector<bool> const& old = list.As<xvector<bool>>();
       xvector<bool>& bits = *static_cast<xvector<bool>*>(made.Get());
-      for (ssize_t i = 0; i < count; ++i) bits[i] = i == at ? *static_cast<bool*>(added->Address()) : old[positionOf(i)];
+      for (ssize_t i = 0; i < count; ++i)
+        bits[i] = i == at ? *static_cast<bool*>(added->Address()) : old[positionOf(i)];
     } else {
       xvector<void*> elements;
       EachEntry(type, list.Address(), [&](void* element) {

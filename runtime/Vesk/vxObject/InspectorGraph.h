@@ -1,5 +1,5 @@
-// The dependency graph around a value, for the page: what it reads, what reads it, what is stale, and since the page looks
-// how often each was calculated and how long that took. Looking calculates nothing.
+// The dependency graph around a value, for the page: what it reads, what reads it, what is stale, and since the page
+// looks how often each was calculated and how long that took. Looking calculates nothing.
 
 @import "Vesk/vxObject/GraphView.h"
 @import "Vesk/vxObject/InspectorTree.h"

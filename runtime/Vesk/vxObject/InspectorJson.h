@@ -175,7 +175,12 @@ inline InspectorJson InspectorJson::Parse(std::string_view text) { return Inspec
 // The length of the UTF-8 sequence that a text begins with; 0 when it is none.
 inline std::size_t InspectorUtf8Length(std::string_view text) {
   const octet_t first = static_cast<octet_t>(text[0]);
-  const std::size_t length = first < 0x80 ? 1 : first < 0xC2 ? 0 : first < 0xE0 ? 2 : first < 0xF0 ? 3 : first < 0xF5 ? 4 : 0;
+  const std::size_t length = first < 0x80   ? 1
+                             : first < 0xC2 ? 0
+                             : first < 0xE0 ? 2
+                             : first < 0xF0 ? 3
+                             : first < 0xF5 ? 4
+                                            : 0;
   if (length == 0 || length > text.size()) return 0;
   for (std::size_t i = 1; i < length; ++i) {
     if ((static_cast<octet_t>(text[i]) & 0xC0) != 0x80) return 0;

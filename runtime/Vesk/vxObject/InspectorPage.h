@@ -15,7 +15,7 @@ namespace vesk {
 
 // With the nonce by which the browser knows its scripts and styles.
 inline xstring InspectorPageText(std::string_view nonce) {
-  const std::string_view scripts[] = {kInspectorLinkJs, kInspectorTreeJs, kInspectorDetailJs, kInspectorTypesJs,
+  const std::string_view scripts[] = {kInspectorLinkJs,  kInspectorTreeJs,    kInspectorDetailJs, kInspectorTypesJs,
                                       kInspectorGraphJs, kInspectorArchiveJs, kInspectorMainJs};
   xstring page, script;
   for (std::string_view part : scripts) script += part;

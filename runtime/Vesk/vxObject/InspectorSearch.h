@@ -1,5 +1,5 @@
-// A search over the names and values of all that is shown. It is done in slices, between which the program goes on: what
-// is kept is not where a value stands, but the positions that lead to it.
+// A search over the names and values of all that is shown. It is done in slices, between which the program goes on:
+// what is kept is not where a value stands, but the positions that lead to it.
 
 @import "Vesk/vxObject/InspectorRows.h"
 
@@ -78,20 +78,21 @@ class InspectorSearch {
     const ssize_t first = resumes ? resume[depth] : 0;
     const bool isNamed = outer.m_value.Kind() != VK_LIST && outer.m_value.Kind() != VK_SET;
     m_resume.push_back(first);
-    InspectorTree::Each(outer, first, InspectorTree::Count(outer) - first, [&](ssize_t at, InspectorPlace const& place) {
-      m_resume[depth] = at;
-      const bool wasTested = resumes && at == first;
-      if (!wasTested && IsFound(place, isNamed)) Add(place, PathTo(outer, at, place.m_name));
-      if (m_found >= kMostFound || Clock::now() >= m_end) {
-        m_isStopped = true;
-        return false;
-      }
-      if (InspectorRows::IsScalar(place.m_value.Kind())) return true;
-      const xstring path = std::exchange(m_path, PathTo(outer, at, place.m_name));
-      Walk(place, wasTested ? resume : xvector<ssize_t>(), depth + 1);
-      m_path = path;
-      return !m_isStopped;
-    });
+    InspectorTree::Each(outer, first, InspectorTree::Count(outer) - first,
+                        [&](ssize_t at, InspectorPlace const& place) {
+                          m_resume[depth] = at;
+                          const bool wasTested = resumes && at == first;
+                          if (!wasTested && IsFound(place, isNamed)) Add(place, PathTo(outer, at, place.m_name));
+                          if (m_found >= kMostFound || Clock::now() >= m_end) {
+                            m_isStopped = true;
+                            return false;
+                          }
+                          if (InspectorRows::IsScalar(place.m_value.Kind())) return true;
+                          const xstring path = std::exchange(m_path, PathTo(outer, at, place.m_name));
+                          Walk(place, wasTested ? resume : xvector<ssize_t>(), depth + 1);
+                          m_path = path;
+                          return !m_isStopped;
+                        });
     if (!m_isStopped) m_resume.pop_back();
   }
   // An object is entered once, and a list of numbers for what may stand in a number.
@@ -110,7 +111,8 @@ class InspectorSearch {
 
   bool IsFound(InspectorPlace const& place, bool isNamed) const {
     if (isNamed && Lower(place.m_name).find(m_text) != xstring::npos) return true;
-    return InspectorRows::IsScalar(place.m_value.Kind()) && Lower(Beginning(place.m_value)).find(m_text) != xstring::npos;
+    return InspectorRows::IsScalar(place.m_value.Kind()) &&
+           Lower(Beginning(place.m_value)).find(m_text) != xstring::npos;
   }
   void Add(InspectorPlace const& place, xstring const& path) {
     if (m_found >= kMostFound) return;

@@ -1,6 +1,6 @@
-// HTTP and WebSocket for the inspector, on Boost.Beast. It listens on this machine alone. Its address has a random token
-// in its path; the page is at /TOKEN/, its WebSocket at /TOKEN/live, and nothing else is anywhere. What comes with
-// another Host, a web page of another origin, or another token gets 403 and nothing said about why.
+// HTTP and WebSocket for the inspector, on Boost.Beast. It listens on this machine alone. Its address has a random
+// token in its path; the page is at /TOKEN/, its WebSocket at /TOKEN/live, and nothing else is anywhere. What comes
+// with another Host, a web page of another origin, or another token gets 403 and nothing said about why.
 //
 // Ahead of a right token a client has 8 KiB and 10 seconds for its request; where all connections are taken the oldest
 // of these makes room. A page that reads slowly is told nothing while 256 KiB wait for it, and not read while 1 MiB do;
@@ -190,16 +190,18 @@ class InspectorServer {
       if (request.method() == Verb::head) response->body().clear();
       response->content_length(length);
       Tcp1().expires_after(m_server.m_limits.m_time);
-      boost::beast::http::async_write(Tcp1(), *response, [self = shared_from_this(), response](Error error, std::size_t) {
-        if (error || !response->keep_alive()) return self->Close();
-        self->ReadRequest();
-      });
+      boost::beast::http::async_write(Tcp1(), *response,
+                                      [self = shared_from_this(), response](Error error, std::size_t) {
+                                        if (error || !response->keep_alive()) return self->Close();
+                                        self->ReadRequest();
+                                      });
     }
     // Scripts and styles of the page alone, nothing from elsewhere, no text that becomes HTML.
     xstring Policy(xstring const& nonce) const {
       const xstring host = vxMakeString("ws://127.0.0.1:" << m_server.m_port << " ws://localhost:" << m_server.m_port);
-      const xstring own = nonce.empty() ? xstring() : vxMakeString("script-src 'nonce-" << nonce << "'; style-src 'nonce-"
-                                                                   << nonce << "'; connect-src " << host << "; ");
+      const xstring own = nonce.empty() ? xstring()
+                                        : vxMakeString("script-src 'nonce-" << nonce << "'; style-src 'nonce-" << nonce
+                                                                            << "'; connect-src " << host << "; ");
       return "default-src 'none'; " + own +
              "img-src data:; base-uri 'none'; form-action 'none'; frame-ancestors 'none'; "
              "require-trusted-types-for 'script'; trusted-types 'none'";
@@ -233,7 +235,7 @@ class InspectorServer {
         if (error || !self->TakeTurn()) return self->End();
         const auto data = self->m_buffer.cdata();
         self->m_session->Receive(std::string_view(static_cast<char const*>(data.data()), data.size()),
-                                  self->m_stream.got_text());
+                                 self->m_stream.got_text());
         self->m_buffer.consume(self->m_buffer.size());
         if (self->m_buffer.capacity() > kMostAnswered) self->m_buffer.shrink_to_fit();
         self->ReadMessage();
@@ -296,7 +298,8 @@ class InspectorServer {
   }
   void Add(Tcp::socket socket) {
     if (m_connections.size() >= m_limits.m_connections) {
-      const auto oldest = std::find_if(m_connections.begin(), m_connections.end(), [](auto* c) { return !c->IsPage(); });
+      const auto oldest =
+          std::find_if(m_connections.begin(), m_connections.end(), [](auto* c) { return !c->IsPage(); });
       if (oldest == m_connections.end()) return;
       (*oldest)->Close();
     }

@@ -130,13 +130,15 @@ class InspectorSession {
 
   void Answer(InspectorWriter& out, InspectorJson const& message) {
     static constexpr Request kRequests[] = {
-        {"hello", &InspectorSession::Hello},   {"rows", &InspectorSession::Rows},     {"look", &InspectorSession::Look},
-        {"watch", &InspectorSession::Watch},   {"types", &InspectorSession::Types},   {"type", &InspectorSession::Type},
-        {"find", &InspectorSession::Find},     {"set", &InspectorSession::Set},       {"insert", &InspectorSession::Insert},
-        {"remove", &InspectorSession::Remove}, {"move", &InspectorSession::Move},     {"undo", &InspectorSession::Undo},
-        {"redo", &InspectorSession::Redo},     {"call", &InspectorSession::Call},
+        {"hello", &InspectorSession::Hello},         {"rows", &InspectorSession::Rows},
+        {"look", &InspectorSession::Look},           {"watch", &InspectorSession::Watch},
+        {"types", &InspectorSession::Types},         {"type", &InspectorSession::Type},
+        {"find", &InspectorSession::Find},           {"set", &InspectorSession::Set},
+        {"insert", &InspectorSession::Insert},       {"remove", &InspectorSession::Remove},
+        {"move", &InspectorSession::Move},           {"undo", &InspectorSession::Undo},
+        {"redo", &InspectorSession::Redo},           {"call", &InspectorSession::Call},
         {"calculate", &InspectorSession::Calculate}, {"graph", &InspectorSession::Graph},
-        {"archive", &InspectorSession::Archive}, {"parts", &InspectorSession::Parts},
+        {"archive", &InspectorSession::Archive},     {"parts", &InspectorSession::Parts},
         {"compare", &InspectorSession::Compare}};
     xstring const& name = message["do"].AsText();
     for (Request const& request : kRequests) {
@@ -211,8 +213,8 @@ class InspectorSession {
     InspectorRows::PutEdited(out, place);
     if (place.m_value) InspectorRows::PutLabels(out, place.m_value);
     const bool mayChange = m_shared.m_changes.IsAllowed();
-    out.Member("editable", mayChange && !place.m_isFixed && (InspectorRows::IsScalar(place.m_value.Kind()) ||
-                                                             place.m_value.Kind() == VK_VARIANT));
+    out.Member("editable", mayChange && !place.m_isFixed &&
+                               (InspectorRows::IsScalar(place.m_value.Kind()) || place.m_value.Kind() == VK_VARIANT));
     if (mayChange && !opened.m_isFixed && InspectorRows::IsList(opened)) {
       out.Member("list", InspectorChanges::IsPlain(opened.m_value, *opened.m_value.Type().m_item) ? "all" : "order");
     }
@@ -235,7 +237,9 @@ class InspectorSession {
 
   // --- What is changed
 
-  void Set(InspectorWriter&, InspectorJson const& message) { m_shared.m_changes.Set(message["path"], message["value"]); }
+  void Set(InspectorWriter&, InspectorJson const& message) {
+    m_shared.m_changes.Set(message["path"], message["value"]);
+  }
   void Insert(InspectorWriter&, InspectorJson const& message) {
     m_shared.m_changes.Insert(message["path"], message["at"].AsCount(0), message["value"]);
   }
@@ -262,7 +266,8 @@ class InspectorSession {
   // --- Graph and archives
 
   void Graph(InspectorWriter& out, InspectorJson const& message) {
-    m_shared.m_graph.Put(out, message["path"], static_cast<uint64>(message["node"].AsCount(0)), message["depth"].AsCount(3));
+    m_shared.m_graph.Put(out, message["path"], static_cast<uint64>(message["node"].AsCount(0)),
+                         message["depth"].AsCount(3));
   }
   void Archive(InspectorWriter& out, InspectorJson const& message) {
     if (!m_shared.m_takesArchives) throw InspectorError("the program takes no archives");

@@ -74,7 +74,8 @@ inline ReflectedType InspectorDeclared(ReflectedClass const& record, std::string
   }
   for (ssize_t i = 0; i < record.m_numModelFields; ++i) {
     ReflectedModelField const& field = record.m_modelFields[i];
-    if (field.m_type && field.m_offset >= 0 && field.m_name == name) return DecodeType({field.m_type, record.m_strings});
+    if (field.m_type && field.m_offset >= 0 && field.m_name == name)
+      return DecodeType({field.m_type, record.m_strings});
     ReflectedClass const* const model = field.m_type ? nullptr : Find<ReflectedClass>(field.m_name);
     if (!model) continue;
     ReflectedType type = InspectorDeclared(*model, name);

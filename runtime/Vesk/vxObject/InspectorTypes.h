@@ -68,8 +68,8 @@ class InspectorTypes {
   static void PutMetadata(InspectorWriter& out, xvector<MetadataValue> const& metadata) {
     if (metadata.empty()) return;
     out.Member("metadata", TextOf([&](xostream& os) {
-      for (MetadataValue const& value : metadata) os << value;
-    }));
+                 for (MetadataValue const& value : metadata) os << value;
+               }));
     InspectorMetadata(metadata).Put(out);
   }
 

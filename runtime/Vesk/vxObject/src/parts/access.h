@@ -135,10 +135,11 @@ Value Value::Target(xstring* name) const {
     target.m_types = m_types;
     target.m_address = *static_cast<void* const*>(m_address);
     if (!target) return Value();
-    target.m_type = m_type->m_code == RC_CREF
-                        ? &m_types->Of(NamedType(RC_CLASS, m_type->m_target.c_str()))
-                        : &m_types->Of(*JsonObjectOf(m_type->m_target, *static_cast<AnyInterface*>(m_address))
-                                            ->GetReflectedClass());
+    target.m_type =
+        m_type->m_code == RC_CREF
+            ? &m_types->Of(NamedType(RC_CLASS, m_type->m_target.c_str()))
+            : &m_types->Of(
+                  *JsonObjectOf(m_type->m_target, *static_cast<AnyInterface*>(m_address))->GetReflectedClass());
     if (name) *name = target.TypeName();
     return target;
   }
