@@ -34,7 +34,7 @@ REFUSED = [
     ("set", {"path": ["shop", "items", 0], "value": None}, "references are not changed"),
     ("remove", {"path": ["shop", "items"], "at": 0}, "references are not changed"),
     ("set", {"path": ["shop", "set", 0], "value": 9}, "cannot be changed by itself"),
-    ("insert", {"path": ["shop", "fixed"], "at": 0}, "no list of any length"),
+    ("insert", {"path": ["shop", "fixed"], "at": 0}, "no list of any length"), ("set", {"path": ["shop", "many"], "value": []}, "too large"),
     ("remove", {"path": ["shop", "numbers"], "at": 3}, "no such position"),
     ("rows", {"path": ["shop", "nothing"]}, "no field nothing"), ("rows", {"path": ["shop", "numbers", -1]}, "any more"),
     ("rows", {"path": ["nobody"]}, "nothing is shown as nobody"), ("rows", {"path": [7]}, "expected a text"), ("rows", {}, "expected a path"),
@@ -304,6 +304,9 @@ def test_page(binary):
         browser.driver.find_element("css selector", "#archive-file").send_keys(f"{workspace.path('one.bin')}\n{workspace.path('two.bin')}")
         browser.wait("document.querySelectorAll('.archive tbody tr').length > 20")
         holds(browser.run("return document.getElementById('view-archives').innerText"), "From one.bin to two.bin", "price", "10", "99", "shop::Item", "release 2", "first")
+        browser.run("""const dropped = new DataTransfer(); dropped.items.add(new File(['junk'], 'junk.bin'));
+            window.dispatchEvent(new DragEvent('drop', { dataTransfer: dropped }))""")
+        browser.wait("document.querySelector('.archive .bad')?.parentElement.innerText.includes('junk.bin')")
         # Search, types, a reload in the middle.
         search = browser.driver.find_element("css selector", "#search")
         search.send_keys("onerror")

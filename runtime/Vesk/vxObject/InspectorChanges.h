@@ -86,6 +86,7 @@ class InspectorChanges {
   void Set(InspectorJson const& path, InspectorJson const& json) {
     InspectorPlace const place = Changeable(path);
     CheckPlain(place.m_value, place.m_value.Type());
+    if (place.m_value.Kind() != VK_CLASS && place.m_value.Count() > kMostSet) throw InspectorError("too large to be set");
     Change change(Change::Set, path, place.m_name);
     change.m_before = std::make_shared<InspectorCopy>(place.m_value);
     change.m_after = Made(place, place.m_value.Type(), json);
@@ -146,6 +147,7 @@ class InspectorChanges {
   };
   typedef xdeque<Change> Changes;
   static constexpr std::size_t kMostChanges = 200;
+  static constexpr ssize_t kMostSet = 10000;  // elements of what is set as a whole: both values are kept
 
   static void CheckPlain(Value const& value, ValueType const& type) {
     if (!IsPlain(value, type)) throw InspectorError("references are not changed from here");

@@ -68,7 +68,7 @@ constexpr std::string_view kInspectorPageCss =
     "  white-space: nowrap; cursor: default; }\n"
     ".row:hover { background: var(--soft); }\n"
     ".row[aria-selected=\x22true\x22] { background: var(--picked); }\n"
-    ".row.flash .text { color: var(--text); background: var(--flash); border-radius: 3px; }\n"
+    ".row.row.flash .text { color: var(--text); background: var(--flash); border-radius: 3px; }\n"
     ".row .twist { flex: none; width: 20px; text-align: center; color: var(--muted); cursor: pointer; user-select: none; }\n"
     ".row .name { flex: none; max-width: 45%; overflow: hidden; text-overflow: ellipsis; }\n"
     ".row .text { overflow: hidden; text-overflow: ellipsis; flex: 0 1 auto; }\n"
