@@ -293,7 +293,7 @@ struct GraphState : PerThread<GraphState> {
   void Update(DGNode const& node);
   void LookAtInputs(DGNode const& node);
   void Calculate(DGNode const& node);
-  bool CalculateWatched(DGNode const& node);
+  void CheckCalculation(DGNode const& node) const;
   void CalculateTimed(DGNode const& node);
   void CalculateHere(DGNode const& node);
   void CalculateElsewhere(DGNode const& node);
@@ -324,7 +324,8 @@ struct GraphState : PerThread<GraphState> {
   xvector<Target> m_targets;
   std::size_t m_lastSerial = 0;
   xvector<Step> m_steps;
-  Rest* m_rest = nullptr;  // what few reads need, and a GraphWatch
+  Rest* m_rest = nullptr;    // what few reads need
+  bool m_isWatched = false;  // by a GraphWatch, which the rest is kept for
 };
 
 }  // namespace vesk

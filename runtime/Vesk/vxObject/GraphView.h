@@ -65,7 +65,8 @@ xvector<DGNode const*> InputsOf(DGNode const& node, std::size_t first, std::size
 xvector<DGNode const*> DependentsOf(DGNode const& node, std::size_t first, std::size_t count);
 
 // The nodes of an object: its reflected `$dep` and `$indep` fields, then, as far as they have a value, those that are
-// not in its record: of mixins, and of `$cache` functions. At most `most` of them.
+// not in its record: of mixins, and of `$cache` functions; of one with keys those that are fresh. At most `most` of
+// them.
 xvector<DGNode const*> NodesOf(ReflectedClass const& record, void const* object, std::size_t most = 1000);
 
 // By the name that GraphNode has; null when there is none.

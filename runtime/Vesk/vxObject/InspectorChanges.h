@@ -86,7 +86,8 @@ class InspectorChanges {
   void Set(InspectorJson const& path, InspectorJson const& json) {
     InspectorPlace const place = Changeable(path);
     CheckPlain(place.m_value, place.m_value.Type());
-    if (place.m_value.Kind() != VK_CLASS && place.m_value.Count() > kMostSet) throw InspectorError("too large to be set");
+    if (place.m_value.Kind() != VK_CLASS && place.m_value.Count() > kMostSet)
+      throw InspectorError("too large to be set");
     Change change(Change::Set, path, place.m_name);
     change.m_before = std::make_shared<InspectorCopy>(place.m_value);
     change.m_after = Made(place, place.m_value.Type(), json);

@@ -2,6 +2,7 @@
 
 @import "Vesk/vxObject/DumpArchive.h"
 @import "Vesk/vxObject/ValueTypes.h"
+@import "Vesk/vxObject/src/shared.h"
 
 namespace vesk {
 
@@ -91,7 +92,6 @@ xstring ArchiveValueText(ArchiveView::Content const& content, ValueType const& t
 xstring ArchivePathText(ArchiveView::Content const& content, uint32 node);
 // Of a node that is no block and no group.
 xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& node);
-xstring LimitText(std::string_view text, std::size_t most);
 
 // Of a group, too: "3 elements", or the name of its type.
 xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node);

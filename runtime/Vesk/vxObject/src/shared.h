@@ -1,6 +1,11 @@
-// What the modules of a process have in common where they see each other's symbols.
+// What the modules of a process have in common where they see each other's symbols, and what parts share.
+
+@import "Vesk/vxObject/Text.h"
 
 namespace vesk {
+
+// At most so many bytes of a text, and dots behind them where there are more.
+xstring LimitText(std::string_view text, std::size_t most);
 
 // One T for all modules, as a variable of an inline function of a header would be. It outlives every static object.
 template <typename T>

@@ -66,9 +66,17 @@ class Comparer {
   Comparer(ArchiveView::Content const& a, ArchiveView::Content const& b)
       : m_old(a), m_new(b), m_most(b.m_options.m_changes) {}
 
+  // Both begin with a value, or with a reference to an object.
+  bool AreAlike() const {
+    auto const& a = m_old.m_content;
+    auto const& b = m_new.m_content;
+    return !a.m_type == !b.m_type &&
+           (a.m_type ? a.m_nodes.empty() == b.m_nodes.empty() : a.m_objects.empty() == b.m_objects.empty());
+  }
+
   xvector<ArchiveChange> Compare() {
     if (m_old.m_content.m_type) {
-      if (!m_old.m_nodes.empty() && !m_new.m_nodes.empty()) Pair(0, 0);
+      if (!m_old.m_nodes.empty()) Pair(0, 0);
     } else {
       PairObjects(1, 1);
     }
@@ -279,7 +287,9 @@ class Comparer {
 }  // namespace
 
 xvector<ArchiveChange> CompareArchives(ArchiveView const& old, ArchiveView const& now) {
-  return Comparer(old.Inside(), now.Inside()).Compare();
+  Comparer comparer(old.Inside(), now.Inside());
+  if (!comparer.AreAlike()) return {{ArchiveChange::Changed, xstring(), xstring(), old.Class(), now.Class()}};
+  return comparer.Compare();
 }
 
 }  // namespace vesk

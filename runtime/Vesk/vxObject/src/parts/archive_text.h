@@ -26,8 +26,12 @@ std::size_t SizeOfCompact(octet_t first) {
   return size;
 }
 
+xstring CountText(std::size_t count, ConstStringZ unit) {
+  return vxMakeString(count << ' ' << unit << (count == 1 ? "" : "s"));
+}
+
 xstring Shortened(std::string text, std::size_t size, std::size_t shown, ConstStringZ unit) {
-  if (shown < size) text += vxMakeString("... (" << size << ' ' << unit << ')');
+  if (shown < size) text += "... (" + CountText(size, unit) + ')';
   return xstring(std::move(text));
 }
 
@@ -36,7 +40,7 @@ xstring QuotedText(octet_t const* bytes, std::size_t size, std::size_t most) {
   std::size_t shown = std::min(size, most);
   while (shown < size && shown > 0 && (bytes[shown] & 0xC0) == 0x80) --shown;
   PutJsonString(text, std::string_view(reinterpret_cast<char const*>(bytes), shown), true);
-  return Shortened(std::move(text), size, shown, "bytes");
+  return Shortened(std::move(text), size, shown, "byte");
 }
 xstring QuotedText16(octet_t const* bytes, std::size_t count, std::size_t most) {
   std::u16string units(std::min(count, most), u'\0');
@@ -44,7 +48,7 @@ xstring QuotedText16(octet_t const* bytes, std::size_t count, std::size_t most) 
   if (ArchivesSwapBytes) SwapBytes(&units[0], units.size(), sizeof(char16_t));
   std::string text;
   PutJsonString(text, units);
-  return Shortened(std::move(text), count, units.size(), "units");
+  return Shortened(std::move(text), count, units.size(), "unit");
 }
 
 xstring ScalarText(ValueType const& type, octet_t const* bytes) {
@@ -147,9 +151,9 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
     case AP_VALUE:
       return ArchiveValueText(content, *node.m_type, bytes);
     case AP_BYTES:
-      return vxMakeString(node.m_size << " bytes that only the class knows");
+      return CountText(node.m_size, "byte") + " that only the class knows";
     case AP_REST:
-      return vxMakeString(node.m_size << " bytes" << (content.m_error.empty() ? ", more than is shown" : ", not read"));
+      return CountText(node.m_size, "byte") + (content.m_error.empty() ? ", more than is shown" : ", not read");
     case AP_GROUP:
       break;
   }
@@ -159,10 +163,10 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
 xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node) {
   ArchiveNode const& of = content.m_nodes[node];
   if (of.m_kind != AP_GROUP) {
-    return of.m_isBlock ? vxMakeString(of.m_size / of.m_type->m_size << " elements") : ArchiveNodeText(content, of);
+    return of.m_isBlock ? CountText(of.m_size / of.m_type->m_size, "element") : ArchiveNodeText(content, of);
   }
   ArchiveNode const* const first = node + 1 < of.m_end ? &content.m_nodes[node + 1] : nullptr;
-  if (first && first->m_kind == AP_COUNT) return ArchiveNodeText(content, *first) + " elements";
+  if (first && first->m_kind == AP_COUNT) return CountText(CompactAt(content.BytesOf(*first)), "element");
   if (first && (first->m_kind == AP_TAG || first->m_kind == AP_NAME)) {
     xstring held;
     if (node + 2 < of.m_end) held = ' ' + ArchiveShortText(content, node + 2);

@@ -19,7 +19,8 @@ Value ObjectToday(ArchiveView::Content const& content, std::size_t object) {
 
 xstring ShortTextOf(Value const& value, std::size_t most) {
   const EValueKind kind = value.Kind();
-  if (kind == VK_LIST || kind == VK_SET || kind == VK_MAP) return vxMakeString(value.Count() << " elements");
+  if (kind == VK_LIST || kind == VK_SET || kind == VK_MAP)
+    return vxMakeString(value.Count() << (value.Count() == 1 ? " element" : " elements"));
   if (kind == VK_REFERENCE) return *static_cast<void* const*>(value.Address()) ? "an object" : "null";
   if (kind == VK_NONE) return xstring();
   if (value.Type().m_code != RC_STRING8) return LimitText(value.Text(), most);
@@ -134,8 +135,18 @@ Value ArchiveView::Today() const {
   return content.m_type ? Value(content.m_declared, content.m_value) : ObjectToday(content, 0);
 }
 
+// A project that the head does not name wrote its first release.
+static bool IsOld(ArchiveView::Content const& content) {
+  for (auto const& [target, release] : content.m_archive.m_releases) {
+    if (target->m_latestModel && release < LastRelease(*target->m_latestModel)) return true;
+  }
+  return std::any_of(content.m_nodes.begin(), content.m_nodes.end(), [&](ArchiveNode const& node) {
+    return node.m_kind == AP_RELEASE && CompactAt(content.BytesOf(node)) != node.m_detail;
+  });
+}
+
 xvector<ArchiveChange> ArchiveView::Evolved() const {
-  if (!m_content->m_isWhole) return {};
+  if (!m_content->m_isWhole || !IsOld(*m_content)) return {};
   return Evolution(*m_content).Find();
 }
 

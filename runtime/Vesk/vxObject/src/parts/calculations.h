@@ -103,18 +103,17 @@ void GraphState::LookAtInputs(DGNode const& outermost) {
 }
 
 inline void GraphState::Calculate(DGNode const& node) {
-  if ((node.m_isCalculating || node.m_unwound || m_rest) && CalculateWatched(node)) return;
+  if (node.m_isCalculating || node.m_unwound || m_rest) {
+    CheckCalculation(node);
+    if (m_isWatched) return CalculateTimed(node);
+  }
   if (IsDeep()) return CalculateElsewhere(node);
   CalculateHere(node);
 }
-// What is seldom to be looked at. Answers whether a GraphWatch had it calculated.
-bool GraphState::CalculateWatched(DGNode const& node) {
+void GraphState::CheckCalculation(DGNode const& node) const {
   if (node.m_isCalculating) throw GraphError("cyclic dependency: " + node.Name());
   if (m_rest) m_rest->RethrowErrorOf(node);
   if (IsWaiting(node)) throw GraphError("cyclic dependency: " + node.Name());
-  if (!m_rest || !m_rest->m_watched) return false;
-  CalculateTimed(node);
-  return true;
 }
 void GraphState::CalculateTimed(DGNode const& node) {
   Timing timing(*this, node);
@@ -178,7 +177,7 @@ void GraphState::EndOfRest() {
     m_rest->m_again.erase(m_rest->m_again.begin());
     Invalidate(*node, hard);
   }
-  if (m_rest && !m_rest->m_watched) delete std::exchange(m_rest, nullptr);
+  if (!m_isWatched) delete std::exchange(m_rest, nullptr);
 }
 
 // --- The calculation that runs

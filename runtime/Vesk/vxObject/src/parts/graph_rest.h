@@ -30,11 +30,7 @@ struct WatchedNodes {
 };
 
 struct GraphState::Rest {
-  void OnDestroy(DGNode const& node) {
-    m_again.erase(&node);
-    m_failed.erase(&node);
-    if (m_watched) m_watched->OnDestroy(node);
-  }
+  void OnDestroy(DGNode const& node);
   void RethrowErrorOf(DGNode const& node) const {
     if (m_failed.empty()) return;
     const auto failed = m_failed.find(&node);
@@ -49,7 +45,7 @@ struct GraphState::Rest {
 // A calculation, while it lives. Does nothing without a watch.
 struct GraphState::Timing {
   Timing(GraphState& state, DGNode const& node) : m_state(state), m_node(node) {
-    if (state.m_rest && state.m_rest->m_watched) Begin();
+    if (state.m_isWatched) Begin();
   }
   ~Timing() {
     if (m_watched) End();

@@ -3,6 +3,7 @@
 
 @import "Vesk/vxObject/GraphView.h"
 @import "Vesk/vxObject/ValueTypes.h"
+@import "Vesk/vxObject/src/shared.h"
 
 #include <cstdlib>
 #include <cstring>
@@ -49,16 +50,23 @@ xstring FindClassName(xstring const& type) {
   return name.substr(begin, name.find(',', begin) - begin);
 }
 
-class ClassNames {
+class NodeTypes {
  public:
-  xstring const& Of(DGNode const& node) {
-    const auto [at, isNew] = m_names.try_emplace(typeid(node));
-    if (isNew) at->second = FindClassName(TypeNameOf(node));
+  struct Type {
+    xstring m_class;
+    bool m_isCache;
+  };
+  Type const& Of(DGNode const& node) {
+    const auto [at, isNew] = m_types.try_emplace(typeid(node));
+    if (isNew) {
+      const xstring name = TypeNameOf(node);
+      at->second = {FindClassName(name), name.find("::_depnode_") != xstring::npos};
+    }
     return at->second;
   }
 
  private:
-  std::unordered_map<std::type_index, xstring> m_names;
+  std::unordered_map<std::type_index, Type> m_types;
 };
 
 // "twice" of "Cell::twice".
@@ -69,10 +77,19 @@ xstring MemberName(xstring const& name) {
 
 octet_t const* AddressOf(DGNode const& node) { return static_cast<octet_t const*>(dynamic_cast<void const*>(&node)); }
 
+// The object is what a node visits last. A stale value may refer to what is gone: only one that is fresh is visited.
 struct LastObject : IObjectVisitor {
   void VisitObject(ptr<IObject> const& object) override { m_object = object; }
   ptr<IObject> m_object;
 };
+
+void const* AskForOwner(DGNode const& node, ReflectedClass const& record) {
+  if (GraphAccess::StateOf(node) != GS_FRESH || !GraphAccess::HasValue(node)) return nullptr;
+  LastObject visitor;
+  node.VisitContainingObject(visitor);
+  const bool isOwner = visitor.m_object && visitor.m_object->GetReflectedClass() == &record;
+  return isOwner ? visitor.m_object.Object() : nullptr;
+}
 
 template <typename Field>
 Field const* FieldNamed(Field const* fields, ssize_t count, xstring const& name) {
@@ -159,11 +176,10 @@ class Viewer {
     if (m_linked.insert({from, to}).second) m_view.m_links.push_back({from, to});
   }
 
-  // A stale value may refer to what is gone: only one that is fresh is asked for its object.
   void DescribeMember(GraphNode& node) {
     const xstring name = MemberName(node.m_node->Name());
     node.m_name = LimitText(name, m_limits.m_text);
-    node.m_class = m_classes.Of(*node.m_node);
+    node.m_class = m_nodeTypes.Of(*node.m_node).m_class;
     ReflectedClass const* const record = Find<ReflectedClass>(node.m_class);
     if (DGIndepNode const* indep = dynamic_cast<DGIndepNode const*>(node.m_node)) {
       node.m_kind = GN_INDEP;
@@ -177,7 +193,7 @@ class Viewer {
       node.m_kind = !name.empty() && name.back() == ')' ? GN_CACHE : GN_DEP;
     }
     if (node.m_kind == GN_DEP && record) DescribeDep(node, *record, name);
-    if (!node.m_owner && node.m_state == GS_FRESH && node.m_hasValue) AskForOwner(node, record);
+    if (!node.m_owner && record) node.m_owner = AskForOwner(*node.m_node, *record);
     if (node.m_owner && record) m_owners[node.m_owner] = record;
   }
   void DescribeDep(GraphNode& node, ReflectedClass const& record, xstring const& name) {
@@ -206,14 +222,6 @@ class Viewer {
     return LimitText(Value(type, const_cast<octet_t*>(address)).Text(), m_limits.m_text);
   }
 
-  // The object is what a node visits last.
-  static void AskForOwner(GraphNode& node, ReflectedClass const* record) {
-    if (!record) return;
-    LastObject visitor;
-    node.m_node->VisitContainingObject(visitor);
-    if (visitor.m_object && visitor.m_object->GetReflectedClass() == record) node.m_owner = visitor.m_object.Object();
-  }
-
   // Of an object whose other nodes are shown, which tell its class.
   void DescribeField(GraphNode& node) {
     GraphSource source;
@@ -232,14 +240,17 @@ class Viewer {
     node.m_name = LimitText(name, m_limits.m_text);
     if (!record) return;
     node.m_class = record->m_name;
-    const Value value = Value(*record, const_cast<void*>(node.m_owner)).Find(name);
-    if (!name.empty() && IsShort(value.Kind())) node.m_value = LimitText(value.Text(), m_limits.m_text);
+    try {
+      const Value value = Value(*record, const_cast<void*>(node.m_owner)).Find(name);
+      if (!name.empty() && IsShort(value.Kind())) node.m_value = LimitText(value.Text(), m_limits.m_text);
+    } catch (AccessError const&) {  // in a container that cannot be walked
+    }
   }
 
   GraphLimits const& m_limits;
   GraphWatch* m_watch;
   ValueTypes m_types;
-  ClassNames m_classes;
+  NodeTypes m_nodeTypes;
   GraphView m_view;
   std::unordered_map<DGNode const*, std::size_t> m_places;
   std::set<std::pair<std::size_t, std::size_t>> m_linked;
@@ -269,16 +280,16 @@ xvector<DGNode const*> DependentsOf(DGNode const& node, std::size_t first, std::
 // in the object, but tells it.
 static void AddCaches(ReflectedClass const& record, void const* object, std::size_t most,
                       xvector<DGNode const*>& nodes) {
-  const GraphLimits limits;
-  Viewer viewer(limits, nullptr);
-  ClassNames classes;
+  NodeTypes types;
   const std::unordered_set<DGNode const*> known(nodes.begin(), nodes.end());
   octet_t const* const begin = static_cast<octet_t const*>(object);
   GraphAccess::EachWithValue([&](DGNode const& node) {
     octet_t const* const at = AddressOf(node);
     const bool isInside = begin <= at && at < begin + record.m_size;
-    if (!isInside && classes.Of(node) != record.m_name) return true;
-    if (known.count(&node) == 0 && (isInside || viewer.Describe(node).m_owner == object)) nodes.push_back(&node);
+    NodeTypes::Type const& type = types.Of(node);
+    const bool isOurs =
+        isInside || (type.m_isCache && type.m_class == record.m_name && AskForOwner(node, record) == object);
+    if (isOurs && known.count(&node) == 0) nodes.push_back(&node);
     return nodes.size() < most;
   });
 }

@@ -4,6 +4,12 @@
 
 namespace vesk {
 
+void GraphState::Rest::OnDestroy(DGNode const& node) {
+  m_again.erase(&node);
+  m_failed.erase(&node);
+  if (m_watched) m_watched->OnDestroy(node);
+}
+
 // --- Counts and times
 
 void GraphState::Timing::Begin() {
@@ -35,6 +41,7 @@ GraphWatch::GraphWatch() : m_state(GraphState::Get()) {
   auto& watched = m_state.NeedRest().m_watched;
   if (!watched) watched = std::make_shared<WatchedNodes>();
   ++watched->m_watches;
+  m_state.m_isWatched = true;
   m_state.Use();
 }
 
@@ -43,6 +50,7 @@ GraphWatch::~GraphWatch() {
   GraphState::Rest*& rest = m_state.m_rest;
   if (--rest->m_watched->m_watches == 0) {
     rest->m_watched.reset();
+    m_state.m_isWatched = false;
     if (!m_state.m_isEvaluating && rest->m_again.empty()) delete std::exchange(rest, nullptr);
   }
   m_state.Release();
