@@ -39,6 +39,8 @@ REFUSED = [
     ("rows", {"path": ["shop", "nothing"]}, "no field nothing"), ("rows", {"path": ["shop", "numbers", -1]}, "any more"),
     ("rows", {"path": ["nobody"]}, "nothing is shown as nobody"), ("rows", {"path": [7]}, "expected a text"), ("rows", {}, "expected a path"),
     ("call", {"path": ["shop"], "method": "Fail", "args": []}, "it fails"),
+    ("set", {"path": ["item", "color"], "value": 1}, "the colour stays"),
+    ("call", {"path": ["shop"], "method": "Break", "args": []}, "no std::exception"), ("set", {"path": ["spot", "y"], "value": 1}, "cannot be changed"),
     ("call", {"path": ["shop"], "method": "Place", "args": [{}]}, "by value: shop::Spot"),
     ("call", {"path": ["shop"], "method": "AddTiny", "args": [1, 1000]}, "b: "),
     ("call", {"path": ["shop"], "method": "AddTiny", "args": [1]}, "takes 2 arguments"),
@@ -69,6 +71,16 @@ def test_changes(program):
         for do, members, error in REFUSED:
             holds(str(page.ask(do, **members)), error)
         equal(page.ask("rows", path=["shop"])["rows"], before)
+        for name in ("numbers", "names", "queue", "bits", "spots"):
+            def texts():
+                return [row["text"] for row in page.ask("rows", path=["shop", name])["rows"]]
+            was = texts()
+            for request in (("insert", {"at": 1}), ("move", {"from": 1, "to": 0}), ("remove", {"at": 0})):
+                equal(page.ask(request[0], path=["shop", name], **request[1]), {})
+                equal(len(texts()), len(was) + (request[0] != "remove"))
+            equal(texts(), was)
+            equal([page.ask("undo") for _ in range(3)], [{}] * 3)
+            equal(texts(), was)
         for name, (value, text) in VALUES.items():
             equal(page.ask("set", path=["shop", name], value=value), {})
             equal(page.text("shop", name), text)
@@ -169,7 +181,7 @@ def test_hostile_pages(program):
             page.send("".join(random.choices(words, k=random.randrange(40))).encode())
         page.send(b"[" * 100000)
         page.send(b'{"id":999,"do":"archive","slot":0}\n' + random.randbytes(5000), 2)
-        assert page.ask("rows", path=[])["count"] == 3
+        equal(page.ask("rows", path=[])["count"], 4)
         page.ask("watch", ranges=[{"path": ["shop", "many"], "first": 10 ** 12, "count": 10 ** 12}] * 5000)
         assert page.ask("rows", path=["shop", "many"], first=0, count=10 ** 15)["count"] == 1000000
     with program.page() as flood:

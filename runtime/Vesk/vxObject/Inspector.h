@@ -37,10 +37,11 @@ class Inspector {
   Inspector(Inspector const&) = delete;
   void operator=(Inspector const&) = delete;
 
-  // Shows a value under a name, in place of what had it. AccessError for a class that nobody registered.
+  // Shows a value under a name, in place of what had it; one that is const cannot be changed. AccessError for a class
+  // that nobody registered.
   template <typename T>
   void Show(xstring const& name, T& value) {
-    ShowBy(name, [shown = Value::Of(value)] { return shown; });
+    m_shared.m_tree.Show(name, [shown = Value::Of(value)] { return shown; }, std::is_const<T>::value);
   }
   template <typename I>
   void ShowObject(xstring const& name, ptr<I> const& object) {
@@ -49,7 +50,7 @@ class Inspector {
     ShowBy(name, [shown = Value(*record, object.Object())] { return shown; });
   }
   // What the function answers whenever it is looked at; an empty Value for nothing.
-  void ShowBy(xstring const& name, std::function<Value()> source) { m_shared.m_tree.Show(name, std::move(source)); }
+  void ShowBy(xstring const& name, std::function<Value()> source) { m_shared.m_tree.Show(name, std::move(source), false); }
   // False when there is nothing of the name.
   bool Hide(xstring const& name) { return m_shared.m_tree.Hide(name); }
 

@@ -14,6 +14,19 @@ class InspectorError : public std::runtime_error {
   using std::runtime_error::runtime_error;
 };
 
+// The text of what is being caught; want of memory goes on.
+inline xstring InspectorErrorText() {
+  try {
+    throw;
+  } catch (std::bad_alloc const&) {
+    throw;
+  } catch (std::exception const& error) {
+    return error.what();
+  } catch (...) {
+    return "something was thrown that is no std::exception";
+  }
+}
+
 // A message, or a part of one. Its texts point into the message, which must outlive it.
 struct InspectorJson {
   enum EKind { Null, Bool, Number, Text, List, Object };

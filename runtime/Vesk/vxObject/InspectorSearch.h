@@ -35,9 +35,8 @@ class InspectorSearch {
       }
       try {
         Look(tree);
-      } catch (std::bad_alloc const&) {
-        throw;
-      } catch (std::exception const&) {  // a source that throws shows nothing
+      } catch (...) {  // a source that throws shows nothing
+        (void)InspectorErrorText();
       }
     }
     m_isDone = !m_isStopped || m_found >= kMostFound;

@@ -66,10 +66,8 @@ class InspectorSession {
         Answer(answer, message);
         answer.Close('}');
         out.Name("ok").Raw(answer.Take());
-      } catch (std::bad_alloc const&) {
-        throw;
-      } catch (std::exception const& error) {
-        out.Member("error", error.what());
+      } catch (...) {
+        out.Member("error", InspectorErrorText());
       }
     } catch (InspectorError const& error) {
       out.Member("error", error.what());
@@ -158,12 +156,10 @@ class InspectorSession {
     InspectorWriter row;
     try {
       InspectorRows::PutRow(row, find());
-    } catch (std::bad_alloc const&) {
-      throw;
-    } catch (std::exception const& error) {
+    } catch (...) {
       row = InspectorWriter();
       row.Member("name", InspectorRows::Cut(name, InspectorRows::kRowBytes)).Member("kind", "none");
-      row.Member("text", error.what()).Member("bad", true);
+      row.Member("text", InspectorErrorText()).Member("bad", true);
     }
     return row.Take();
   }
@@ -327,9 +323,8 @@ class InspectorSession {
     ssize_t total = -1;
     try {
       rows = RowsOf(InspectorJson::Parse(range.m_path), range.m_first, range.m_count, total);
-    } catch (std::bad_alloc const&) {
-      throw;
-    } catch (std::exception const&) {  // it is gone
+    } catch (...) {  // it is gone
+      (void)InspectorErrorText();
       total = -1;
     }
     if (total != range.m_total) told.Member("count", total);

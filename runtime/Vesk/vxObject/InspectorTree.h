@@ -100,11 +100,16 @@ inline ReflectedType InspectorInner(ReflectedType type) {
 class InspectorTree {
  public:
   typedef std::function<Value()> Source;
+  struct Shown {
+    Source m_source;
+    bool m_isFixed;
+  };
   typedef std::function<bool(ssize_t position, InspectorPlace const& place)> EachFunction;
 
-  void Show(xstring const& name, Source source) { m_roots[name] = std::move(source); }
+  // `isFixed`: of what must not be changed.
+  void Show(xstring const& name, Source source, bool isFixed) { m_roots[name] = {std::move(source), isFixed}; }
   bool Hide(xstring const& name) { return m_roots.erase(name) > 0; }
-  std::map<xstring, Source> const& Roots() const { return m_roots; }
+  std::map<xstring, Shown> const& Roots() const { return m_roots; }
 
   // InspectorError where there is nothing at the path (any more).
   InspectorPlace Find(InspectorJson const& path) const {
@@ -118,7 +123,8 @@ class InspectorTree {
     if (at == m_roots.end()) throw InspectorError("nothing is shown as " + name);
     InspectorPlace place;
     place.m_name = name;
-    place.m_value = at->second();
+    place.m_value = at->second.m_source();
+    place.m_isFixed = at->second.m_isFixed;
     return place;
   }
 
@@ -255,7 +261,7 @@ class InspectorTree {
     throw InspectorError("no field " + name + " in " + outer.m_value.TypeName());
   }
 
-  std::map<xstring, Source> m_roots;
+  std::map<xstring, Shown> m_roots;
 };
 
 }  // namespace vesk

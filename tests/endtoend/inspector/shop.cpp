@@ -52,6 +52,8 @@ int main(int argc, char** argv)
     Fill(made, items);
     vesk::Inspector inspector("Shop <b>");
     inspector.Show("shop", made);
+    const shop::Spot fixed = shop::Spot();
+    inspector.Show("spot", fixed);
     inspector.ShowObject("item", vesk::ptr<shop::IItem>(&items[0]));
     inspector.ShowBy("broken", []() -> vesk::Value { throw std::runtime_error("no <source>"); });
     if (mode == "serve")
@@ -71,6 +73,9 @@ int main(int argc, char** argv)
         }
         return 0;
     }
+    const vesk::ModelHook guard([](vesk::ModelChange const& change) {
+        if (change.PathText() == "color") throw std::runtime_error("the colour stays");
+    });
     inspector.AllowChanges(mode != "readonly");
     if (mode == "count")  // what Poll costs while nobody looks
     {

@@ -76,6 +76,7 @@ public:
     $float32 Half(float32 f) const { return f / 2; }
     $uint64 Big(uint64 n) { huge = n; return huge; }
     $void Fail() { throw std::runtime_error("it fails"); }
+    $void Break() { throw 5; }
     $void Place(Spot spot) { spots.push_back(spot); }
 };
 
