@@ -5,12 +5,13 @@ import functools
 import json
 import random
 import re
+import shutil
 import subprocess
 import time
 
 from browser_fixture import Browser, with_selenium
-from inspector_fixture import ADDRESSES, SOURCES, THREADS, Page, Program, built
-from workspace_fixture import ROOT, Workspace, equal, holds, run_tests
+from inspector_fixture import ADDRESSES, THREADS, Page, Program, built
+from workspace_fixture import ROOT, Workspace, equal, holds, need, run_tests
 
 with_selenium()
 
@@ -359,6 +360,17 @@ def test_looks(binary):
                     equal(browser.run(contrast), [])
                     assert browser.run("return document.documentElement.scrollWidth <= innerWidth"), f"{view} is wider than {width}"
                 equal(browser.console(), [])
+
+
+def test_example(binary):
+    """The greenhouse prints its address, and ends by itself."""
+    need("g++")
+    with Workspace(binary, {}) as workspace:
+        shutil.copytree(ROOT / "examples/inspector/tree", workspace.path("tree"))
+        text = (ROOT / "examples/inspector/inspector.qrex").read_text()
+        workspace.write("inspector.qrex", text.replace("../../runtime", str(ROOT / "runtime")))
+        holds(workspace.run("inspector.qrex"), "\nCompleted..")
+        holds(workspace.shell("out/lib/x64/Debug/greenhouse 1"), "Look at http://127.0.0.1:", "After 4 minutes: Sweet Million is 10.", " cm high")
 
 
 def test_new_workspace(binary):

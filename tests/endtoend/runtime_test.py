@@ -102,7 +102,7 @@ def test_headers(binary):
         headers = sorted(path.name for path in workspace.path(f"{root}/Vesk/vxObject").glob("*.h"))
         assert len(headers) > 30, headers
         if not has_asio():
-            headers.remove("SocketChannel.h")
+            headers = [name for name in headers if name not in ("SocketChannel.h", "Inspector.h", "InspectorServer.h")]
 
         def errors_of(header):
             done = subprocess.run(["g++", "-std=c++17", "-fsyntax-only", "-w", f"-I{root}", "-xc++", "-"], cwd=workspace.folder,
