@@ -110,6 +110,7 @@ class InspectorSession {
 
  private:
   static constexpr std::chrono::milliseconds kSlice{10};
+  static constexpr ssize_t kMostFirst = ssize_t(1) << 48;  // more than any container has
 
   typedef void (InspectorSession::*Handler)(InspectorWriter& out, InspectorJson const& message);
   struct Request {
@@ -284,7 +285,7 @@ class InspectorSession {
     for (InspectorJson const& item : message["ranges"].m_items) {
       Range range;
       range.m_path = xstring(item["path"].m_raw);
-      range.m_first = std::max<ssize_t>(item["first"].AsCount(0), 0);
+      range.m_first = std::min(std::max<ssize_t>(item["first"].AsCount(0), 0), kMostFirst);
       range.m_count = std::max<ssize_t>(std::min(item["count"].AsCount(0), kMostRows - rows), 0);
       rows += std::max<ssize_t>(range.m_count, 1);
       if (rows > kMostRows) break;

@@ -147,7 +147,7 @@ class InspectorTree {
   // [first, first + count) of them, until `each` answers false.
   static void Each(InspectorPlace const& outer, ssize_t first, ssize_t count, EachFunction const& each) {
     const InspectorPlace opened = Opened(outer);
-    const ssize_t end = first + count;
+    const ssize_t end = first + std::min(count, std::numeric_limits<ssize_t>::max() - first);
     bool goesOn = true;
     ssize_t position = first;
     auto one = [&](xstring const& name, Value const& value) {
