@@ -2,13 +2,14 @@
 // WriteObject wrote; an ArchiveView has the same as data, with the release that wrote it, what the `$evolve` code makes
 // of it, and what differs from another one.
 //
-//   offset    bytes                    path              type           value
-//   00000000  ff 76 78 02                                               objects, form 2
-//   00000004  01                       releases                         1 project
-//   00000005  03 61 70 70              releases[0]                      "app"
-//   00000009  01                       releases[0]                      release 1, now 3
+//   offset    bytes                     path             type            value
+//   00000000  ff 76 78 02                                head            objects, form 2
+//   00000005  03 61 70 70                                project         "app"
+//   00000009  01                                         release         1 of app, today 2
 //   ...
-//   0000000d  04 74 65 78 74           #1.title          string8        "text"
+//   00000013  03 41 6e 6e               #1.customer      string8         "Ann"
+//   as it is read today:
+//     #1.mean: not written -> 2
 //
 // The records of classes tell how their models were laid out in each release, so an archive of an old release is read
 // as it was written. A class that has a Deserialise of its own tells nothing: its bytes are shown as they are, as far
@@ -62,7 +63,7 @@ struct ArchiveChange {
 
 struct ArchiveOptions {
   ArchiveLimits m_limits;
-  // As in ReadObjects: which classes and types may be made.
+  // As of an InputArchive: which classes and types may be made.
   std::function<bool(ReflectedClass const&)> m_allow;
   std::function<bool(xstring const&)> m_allowType;
   std::size_t m_parts = 1000000;  // what follows is one part, AP_REST
