@@ -41,7 +41,8 @@ class Inspector {
   // that nobody registered.
   template <typename T>
   void Show(xstring const& name, T& value) {
-    m_shared.m_tree.Show(name, [shown = Value::Of(value)] { return shown; }, std::is_const<T>::value);
+    m_shared.m_tree.Show(
+        name, [shown = Value::Of(value)] { return shown; }, std::is_const<T>::value);
   }
   template <typename I>
   void ShowObject(xstring const& name, ptr<I> const& object) {
@@ -50,7 +51,9 @@ class Inspector {
     ShowBy(name, [shown = Value(*record, object.Object())] { return shown; });
   }
   // What the function answers whenever it is looked at; an empty Value for nothing.
-  void ShowBy(xstring const& name, std::function<Value()> source) { m_shared.m_tree.Show(name, std::move(source), false); }
+  void ShowBy(xstring const& name, std::function<Value()> source) {
+    m_shared.m_tree.Show(name, std::move(source), false);
+  }
   // False when there is nothing of the name.
   bool Hide(xstring const& name) { return m_shared.m_tree.Hide(name); }
 

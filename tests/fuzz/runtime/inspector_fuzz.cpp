@@ -26,7 +26,8 @@ struct Shown {
   }
   template <typename T>
   void Show(vesk::xstring const& name, T& value) {
-    shared.m_tree.Show(name, [&value] { return vesk::Value::Of(value); }, false);
+    shared.m_tree.Show(
+        name, [&value] { return vesk::Value::Of(value); }, false);
   }
   kinds::Reflected reflected;
   kinds::Everything everything;
