@@ -1,7 +1,6 @@
 #include "driver/command_line.h"
 
 #include <algorithm>
-#include <iterator>
 #include <set>
 
 #include "driver/config_parser.h"
@@ -14,6 +13,7 @@
 #include "text/files.h"
 #include "text/paths.h"
 #include "text/scope_timer.h"
+#include "text/spelling.h"
 #include "text/trace.h"
 #include "text/version.h"
 
@@ -37,16 +37,6 @@ bool ReadAssignment(const std::string& argument, std::string& name, std::string&
   } catch (const LexScannerException&) {
     return false;  // no assignment: the argument is the configuration
   }
-}
-
-// Whether the words have the same letters but for one, or in another order.
-bool IsAlmost(std::string_view word, std::string_view other) {
-  std::string a(word), b(other);
-  std::sort(a.begin(), a.end());
-  std::sort(b.begin(), b.end());
-  std::string apart;
-  std::set_symmetric_difference(a.begin(), a.end(), b.begin(), b.end(), std::back_inserter(apart));
-  return apart.size() <= 2;
 }
 
 // For what was taken for the path of a configuration, and is none.

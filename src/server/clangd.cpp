@@ -10,10 +10,10 @@ namespace {
 
 constexpr int kMostIdleDeaths = 5;
 
-Json Capabilities() {
+Json Capabilities(const Json& completionItem) {
   return {{"offsetEncoding", {"utf-8"}},
           {"textDocument",
-           {{"completion", {{"completionItem", {{"snippetSupport", true}, {"documentationFormat", {"markdown"}}}}}},
+           {{"completion", {{"completionItem", completionItem}}},
             {"hover", {{"contentFormat", {"markdown", "plaintext"}}}},
             {"definition", {{"linkSupport", false}}},
             {"documentSymbol", {{"hierarchicalDocumentSymbolSupport", true}}},
@@ -25,8 +25,11 @@ Json Capabilities() {
 
 }  // namespace
 
-Clangd::Clangd(std::vector<std::string> words, std::string folder, Arrive arrive)
-    : m_words(std::move(words)), m_folder(std::move(folder)), m_arrive(std::move(arrive)) {
+Clangd::Clangd(std::vector<std::string> words, std::string folder, Json completionItem, Arrive arrive)
+    : m_words(std::move(words)),
+      m_folder(std::move(folder)),
+      m_completionItem(std::move(completionItem)),
+      m_arrive(std::move(arrive)) {
   Start();
 }
 
@@ -50,7 +53,8 @@ void Clangd::Start() {
     m_arrive(generation, std::nullopt);
   });
   m_isReady = false;
-  const Json params = {{"processId", nullptr}, {"rootUri", UriOfPath(m_folder)}, {"capabilities", Capabilities()}};
+  const Json params = {
+      {"processId", nullptr}, {"rootUri", UriOfPath(m_folder)}, {"capabilities", Capabilities(m_completionItem)}};
   const int64_t id = m_nextId++;
   const auto begin = [this](const Json&) {
     m_isReady = true;

@@ -21,7 +21,8 @@ class Clangd {
   // Called from another thread: a message of the child of this generation, or none where that has ended.
   using Arrive = std::function<void(int generation, std::optional<std::string> body)>;
 
-  Clangd(std::vector<std::string> words, std::string folder, Arrive arrive);
+  // `completionItem`: what the editor can do with items of completion, in words of the protocol.
+  Clangd(std::vector<std::string> words, std::string folder, Json completionItem, Arrive arrive);
   ~Clangd();
 
   bool IsRunning() const { return m_peer != nullptr; }
@@ -54,6 +55,7 @@ class Clangd {
 
   const std::vector<std::string> m_words;
   const std::string m_folder;
+  const Json m_completionItem;
   const Arrive m_arrive;
   std::unique_ptr<platform::PeerProcess> m_peer;
   std::thread m_reader;

@@ -147,7 +147,7 @@ void Server::StartClangd() {
   m_clangd = std::make_unique<Clangd>(
       std::vector<std::string>{program, "--compile-commands-dir=" + m_mirror, "--use-dirty-headers", "--log=error",
                                "--header-insertion=never"},
-      FolderOf(m_configuration), [this](int generation, std::optional<std::string> body) {
+      FolderOf(m_configuration), m_completionItem, [this](int generation, std::optional<std::string> body) {
         m_mailbox.Put({false, generation, std::move(body)});
       });
 }

@@ -1,6 +1,7 @@
 // What the editor asks for: about our own languages it is answered here, about C++ by clangd, whose places are mapped.
 #include <algorithm>
 
+#include "server/quick_fixes.h"
 #include "server/server.h"
 
 namespace qrex::server {
@@ -50,9 +51,13 @@ void Server::AskAt(const std::string& method, const Json& params, const Place& p
 
 void Server::Hover(const Json& params, Reply reply) {
   const auto place = PlaceOf(params);
-  if (!place || !place->file) return reply(nullptr);
-  const std::string own = m_own->Hover(*place->file, place->offset);
+  if (!place) return reply(nullptr);
+  const bool isProject = IsProjectText(*place->document);
+  if (!isProject && !place->file) return reply(nullptr);
+  const std::string own = isProject ? HoverInProject(place->document->path, place->document->text.Text(), place->offset)
+                                    : m_own->Hover(*place->file, place->offset);
   if (!own.empty()) return reply({{"contents", {{"kind", "markdown"}, {"value", own}}}});
+  if (isProject) return reply(nullptr);
   AskAt("textDocument/hover", params, *place, [this, file = place->file, reply](const Json& answer) {
     reply(answer.is_object() ? m_mapping->WithRanges(*file, answer) : Json(nullptr));
   });
@@ -243,22 +248,11 @@ void Server::InlayHints(const Json& params, Reply reply) {
 // What a message names as its cure, and what clangd offers for text that was copied.
 void Server::CodeActions(const Json& params, Reply reply) {
   Document* const document = FindDocument(params);
-  if (!document || !document->file) return reply(nullptr);
+  if (!document || !m_world) return reply(nullptr);
+  Json actions = QuickFixes(*m_world, *m_mapping, m_texts)
+                     .Of(document->uri, document->text, document->file, At(params, "context/diagnostics"));
   ProjectFile* const file = document->file;
-  Json actions = Json::array();
-  const std::string asksFor = "did you mean ";
-  for (const Json& diagnostic : At(params, "context/diagnostics")) {
-    const std::string message = TextAt(diagnostic, "message");
-    const size_t at = message.find(asksFor), end = at == std::string::npos ? at : message.find('?', at);
-    if (TextAt(diagnostic, "source") != "qrex" || end == std::string::npos) continue;
-    const std::string word = message.substr(at + asksFor.size(), end - at - asksFor.size());
-    const Json edit = {{"range", At(diagnostic, "range")}, {"newText", word}};
-    actions.push_back({{"title", "write " + word},
-                       {"kind", "quickfix"},
-                       {"diagnostics", {diagnostic}},
-                       {"edit", {{"changes", {{document->uri, {edit}}}}}}});
-  }
-  if (!m_clangd) return reply(std::move(actions));
+  if (!m_clangd || !file) return reply(std::move(actions));
   const auto begin = m_mapping->ToGenerated(*file, PositionFrom(At(params, "range/start")));
   const auto last = m_mapping->ToGenerated(*file, PositionFrom(At(params, "range/end")));
   if (!begin || !last) return reply(std::move(actions));

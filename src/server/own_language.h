@@ -35,6 +35,7 @@ class OwnLanguage {
 // --- Of a text alone
 Json CompletionInSource(std::string_view text, size_t offset);  // behind `@`, `$` and in `<< >>`; null elsewhere
 Json CompletionInProject(const std::string& path, std::string_view text, size_t offset);
+std::string HoverInProject(const std::string& path, std::string_view text, size_t offset);  // of a key: what it does
 std::vector<std::string> TokenTypes();
 Json SemanticTokens(const TextIndex& text, Columns columns);  // `data` of the protocol
 Json FoldingRanges(const TextIndex& text);

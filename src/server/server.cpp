@@ -172,6 +172,8 @@ void Server::Initialize(const Json& id, const Json& params) {
   for (const Json& encoding : At(params, "capabilities/general/positionEncodings")) {
     if (encoding == "utf-8") m_columns = Columns::Utf8;
   }
+  const Json& item = At(params, "capabilities/textDocument/completion/completionItem");
+  m_completionItem = item.is_object() ? item : Json::object();
   m_rootFolder = PathOfUri(TextAt(params, "rootUri"));
   const Json& folders = At(params, "workspaceFolders");
   if (m_rootFolder.empty() && folders.is_array() && !folders.empty())

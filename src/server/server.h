@@ -137,6 +137,7 @@ class Server {
   std::unique_ptr<OwnLanguage> m_own;
   std::unique_ptr<Clangd> m_clangd;
   Columns m_columns = Columns::Utf16;
+  Json m_completionItem;        // what the editor can do with one
   std::string m_configuration;  // absolute; empty: none was found yet
   std::vector<std::string> m_lines, m_clangdWords;
   std::string m_rootFolder;

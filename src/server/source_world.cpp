@@ -1,6 +1,7 @@
 #include "server/source_world.h"
 
 #include <algorithm>
+#include <utility>
 
 #include "driver/config_parser.h"
 #include "driver/data_folder.h"
@@ -101,8 +102,26 @@ ProjectFile* SourceWorld::FindGenerated(const std::string& path) const {
 
 void SourceWorld::Take(const Message& message) {
   if (m_isApart) return;
-  m_messages[message.place.file].push_back(message);
-  m_touched.insert(message.place.file);
+  Message placed = message;
+  if (placed.place.file.empty() && m_underway) placed.place = PlaceOfImport(*m_underway, message.text);
+  m_touched.insert(placed.place.file);
+  m_messages[placed.place.file].push_back(std::move(placed));
+}
+
+// What cannot be used is told without a place: it is at the import that names it.
+SourcePlace SourceWorld::PlaceOfImport(ProjectFile& file, const std::string& text) {
+  const TextIndex& source = m_translated[&file]->source;
+  const ScannedFile& scanned = FilesOf(*file.project)->GetScannedFile(file);
+  for (size_t line = 0, start = 0; line < source.LineCount(); start += source.Line(line++).size() + 1) {
+    const std::string_view words = source.Line(line);
+    const size_t open = words.find('"'), close = words.find('"', open + 1);
+    if (words.find("@import") > open || close == std::string_view::npos) continue;
+    const ProjectFile* const imported = scanned.ResolveImport(std::string(words.substr(open + 1, close - open - 1)));
+    if (!imported || text.find(SourcePathOf(*imported)) == std::string::npos) continue;
+    return {SourcePathOf(file), static_cast<int64_t>(line) + 1, static_cast<int64_t>(start + open + 1),
+            static_cast<int64_t>(start + close)};
+  }
+  return {SourcePathOf(file), 1, -1, -1};
 }
 
 void SourceWorld::ForgetMessages(const std::string& path) {
@@ -189,6 +208,7 @@ void SourceWorld::Translate(ProjectFile& file, Translated& translated) {
     return;
   }
   ScannedFile& scanned = files->GetScannedFile(file);
+  ProjectFile* const outer = std::exchange(m_underway, &file);
   try {
     BringUpToDate(scanned);
     const KeptOutput& output = files->OutputOf(scanned);
@@ -201,6 +221,7 @@ void SourceWorld::Translate(ProjectFile& file, Translated& translated) {
     translated.isFaulty = true;
     Take(ErrorOf(exception));
   }
+  m_underway = outer;
 }
 
 void SourceWorld::Mirror(ProjectFile& file) { WriteMirrored(file, TranslationOf(file).generated.Text()); }

@@ -63,6 +63,7 @@ class SourceWorld : private MessageConsumer {
 
  private:
   void Take(const Message& message) override;
+  SourcePlace PlaceOfImport(ProjectFile& file, const std::string& text);
   KeepingFiles* FilesOf(Project& project);
   void Translate(ProjectFile& file, Translated& translated);
   void ForgetMessages(const std::string& path);
@@ -77,6 +78,7 @@ class SourceWorld : private MessageConsumer {
   std::unordered_map<const ProjectFile*, std::unique_ptr<Translated>> m_translated;
   std::unique_ptr<KeepingFiles> m_apart;  // of the project that is mirrored
   bool m_isApart = false;
+  ProjectFile* m_underway = nullptr;       // which is translated, and told of
   std::set<const ProjectFile*> m_current;  // of these, what is still so
   std::map<std::string, std::vector<Message>> m_messages;
   std::set<std::string> m_touched;

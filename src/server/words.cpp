@@ -5,8 +5,8 @@
 #include <string_view>
 
 #include "driver/config_keys.h"
-#include "lex/scanner.h"
 #include "macro/directives.h"
+#include "server/each_token.h"
 #include "server/own_language.h"
 #include "text/paths.h"
 #include "translator/file/keywords.h"
@@ -38,25 +38,6 @@ bool IsInQualifiers(std::string_view text, size_t at) {
 constexpr std::string_view kProjectWords[] = {"qrex",    "config", "subproj", "directories", "toolfiles",
                                               "general", "export", "exclude", "src",         "cpp",
                                               "rc",      "link",   "as"};
-
-// Calls `take` with each token and its place; what it gives is where the next one is looked for. What is no token is
-// passed by.
-template <typename Take>
-void ForEachToken(std::string_view text, Take take) {
-  LexScanner scanner(text, Dialect::Cpp);
-  for (size_t at = 0; at < text.size();) {
-    scanner.begin = text.data() + at;
-    try {
-      const LexToken token = NextToken(scanner);
-      if (token.kind == kEndOfText) return;
-      const auto begin = static_cast<size_t>(token.text.begin - text.data());
-      const auto end = static_cast<size_t>(token.text.end - text.data());
-      at = std::max(take(token.kind, begin, end), at + 1);
-    } catch (const LexScannerException&) {
-      ++at;
-    }
-  }
-}
 
 }  // namespace
 
@@ -104,6 +85,16 @@ Json CompletionInProject(const std::string& path, std::string_view text, size_t 
   addKeys(kPathVariables);
   addKeys(kModes);
   return items;
+}
+
+std::string HoverInProject(const std::string& path, std::string_view text, size_t offset) {
+  const WordPlace place = WordAt(text, offset);
+  const std::string word(text.substr(place.begin, place.end - place.begin));
+  for (const Json& item : CompletionInProject(path, "", 0)) {
+    const std::string help = TextAt(item, "detail");
+    if (TextAt(item, "label") == word && !help.empty()) return "`" + word + "`: " + help;
+  }
+  return {};
 }
 
 // --- Colours

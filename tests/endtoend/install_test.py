@@ -15,7 +15,7 @@ from pathlib import Path
 
 from workspace_fixture import equal, holds, lacks, need, run_tests
 
-INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
+INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/qrex/editors/vim/ftdetect/qrex.vim", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex",
              "lib/cmake/Qrex/QrexConfig.cmake"]
 RUNTIME = ["share/qrex/runtime/Vesk/vxObject/IObject.h", "lib/qrex/include/Vesk/vxObject/IObject.h",

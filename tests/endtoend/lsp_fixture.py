@@ -19,7 +19,7 @@ class Client:
     """Starts the server for a folder, and keeps what it tells. `place(name, text, within=0)` finds positions by the text that
     stands there, so that tests speak of names."""
 
-    def __init__(self, server, folder, encoding="utf-16", **options):
+    def __init__(self, server, folder, encoding="utf-16", snippets=False, **options):
         self.folder, self.encoding = Path(folder).resolve(), encoding
         self.process = subprocess.Popen([server], stdin=subprocess.PIPE, stdout=subprocess.PIPE, cwd=folder)
         self.arrived, self.answers, self.notes, self.diagnostics, self.texts = queue.Queue(), {}, [], {}, {}
@@ -27,7 +27,8 @@ class Client:
         threading.Thread(target=self._read, daemon=True).start()
         self.capabilities = self.ask("initialize", {
             "processId": None, "rootUri": uri_of(self.folder), "initializationOptions": options,
-            "capabilities": {"general": {"positionEncodings": [encoding]}}})["capabilities"]
+            "capabilities": {"general": {"positionEncodings": [encoding]},
+                             "textDocument": {"completion": {"completionItem": {"snippetSupport": snippets}}}}})["capabilities"]
         self.tell("initialized", {})
 
     def __enter__(self):
@@ -123,6 +124,21 @@ class Client:
         change = {"range": {"start": self.position(name, at), "end": self.position(name, at + len(old))}, "text": new}
         self.texts[name] = self.texts[name][:at] + new + self.texts[name][at + len(old):]
         self.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(self.path(name)), "version": 2}, "contentChanges": [change]})
+
+    def offset(self, name, position):
+        lines = self.texts[name].split("\n")
+        line = lines[position["line"]]
+        return sum(len(ahead) + 1 for ahead in lines[:position["line"]]) + next(
+            n for n in range(len(line) + 1) if self.units(line[:n]) >= position["character"])
+
+    def apply(self, action):
+        """An action with one edit of an open text, as an editor does it."""
+        [(uri, [edit])] = action["edit"]["changes"].items()
+        name = str(Path(unquote(uri)[7:]).relative_to(self.folder))
+        begin, end = (self.offset(name, edit["range"][side]) for side in ("start", "end"))
+        self.texts[name] = self.texts[name][:begin] + edit["newText"] + self.texts[name][end:]
+        self.tell("textDocument/didChange", {"textDocument": {"uri": uri, "version": 2},
+                                             "contentChanges": [{"range": edit["range"], "text": edit["newText"]}]})
 
     def text_at(self, location):
         """(name, text) of a location or range in a file of the folder, from the text of the editor or of the disk."""

@@ -18,7 +18,7 @@ HEADER = """@import "Vesk/vxObject/IObject.h"
 
 namespace geo
 {
-$struct+ Shape
+$struct+ Shape <<compare>>
 {
     $float64 width;
     $float64 Area(float64 factor) const
@@ -48,10 +48,17 @@ int main()
     return count + (size > 3);
 }
 """
+CODES = "namespace codes\n{\n$enum+ Code { fine, lost };\n}\n"
+PLAIN = "tree/plain/src/plain.qrpj"
 SHAPE, APP, PROJECT = "tree/app/src/shape.h", "tree/app/src/app.cpp", "tree/app/src/app.qrpj"
 FILES = {
     "all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true modernCpp = true\n',
-    "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "app" }\n', SHAPE: HEADER, APP: MAIN,
+    "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "codes" "plain" "app" }\n', SHAPE: HEADER, APP: MAIN,
+    "tree/codes/api/codes.h": CODES, "tree/app/src/beside.h": "$enum+ Other { one };\n",
+    "tree/codes/src/codes.qrpj": '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "codes"\nqrex\nconfig { "Debug|x64" }\n'
+                                 '{ "api" { "codes.h" } }\n',
+    PLAIN: '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "plain"\nconfig { "Debug|x64" }\n{ "api" { "plain.h" } }\n',
+    "tree/plain/api/plain.h": "$enum+ Plain { yes };\n",
     PROJECT: '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nqrex subproj { "Vesk/vxObject" }\n'
              'config { "Debug|x64" }\n{ "src" { "shape.h" "app.cpp" } }\n'}
 
@@ -129,6 +136,7 @@ def test_own_language(client):
     client.open("all.qrex")
     words = {i["label"] for i in client.ask("textDocument/completion", client.place("all.qrex", "virtualTree", 3))}
     assert {"virtualTree", "lineDirectives"} <= words
+    holds(client.ask("textDocument/hover", client.place("all.qrex", "virtualTree"))["contents"]["value"], "`virtualTree`: ")
     tokens = client.ask("textDocument/semanticTokens/full", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})["data"]
     equal(tokens[:10], [0, 0, 7, 0, 0, 1, 0, 4, 0, 0])  # @import, @def
     folds = client.ask("textDocument/foldingRange", {"textDocument": {"uri": uri_of(client.path(SHAPE))}})
@@ -138,6 +146,49 @@ def test_own_language(client):
     client.edit(APP, "count = 1", "count = 7")
     while not any(n["method"] == "qrex/generatedChanged" and "count = 7" in n["params"]["text"] for n in client.notes):
         client.take()
+
+
+def fix(client, name, message, title):
+    """Waits for an error with this text, and lets the server mend it as the title says."""
+    found = next(d for d in client.until(name, lambda d: message in str(errors(d))) if message in d["message"])
+    actions = client.ask("textDocument/codeAction", {"textDocument": {"uri": uri_of(client.path(name))}, "range": found["range"],
+                                                     "context": {"diagnostics": [found]}})
+    fits = [action for action in actions if action["title"] == title]
+    assert fits, [action["title"] for action in actions]
+    client.apply(fits[0])
+
+
+@session()
+def test_quick_fixes(client):
+    """What messages name as a cure is an edit, of the source or of its project."""
+    for name in (SHAPE, APP, PROJECT, PLAIN):
+        client.open(name)
+    client.edit(SHAPE, "$float64 width;", "$codes::Code code; $float64 width;")
+    fix(client, SHAPE, "Unrecognised identifier : codes", 'add @import "codes/api/codes.h"')
+    holds(client.texts[SHAPE], 'vxObject/IObject.h"\n@import "codes/api/codes.h"\n@def')
+    for right, wrong in (("class", "clas"), ("float64", "flaot64"), ("compare", "comparr")):
+        client.edit(SHAPE, right, wrong)
+        fix(client, SHAPE, wrong, f"write {right}")
+    client.until(SHAPE, lambda d: not d)
+    client.edit(APP, '"shape.h"', '"shape.h"\n@import "beside.h"')
+    fix(client, APP, "no project lists", f"list app/src/beside.h in {PROJECT}")
+    holds(client.texts[PROJECT], '"src" { "beside.h" "shape.h"')
+    client.until(APP, lambda d: not d)
+    client.edit(APP, '@import "beside.h"', '@import "plain/api/plain.h"')
+    fix(client, APP, "write qrex in", f"write qrex in {PLAIN}")
+    holds(client.texts[PLAIN], '"plain"\nqrex\nconfig')
+    client.until(APP, lambda d: not d)
+    client.edit(PLAIN, "qrex\n", "")
+    fix(client, APP, "subproj", f'write "plain" in {PROJECT}')
+    holds(client.texts[PROJECT], 'subproj { "plain" "Vesk/vxObject" }')
+    client.edit(PLAIN, "config", "qrex\nconfig")
+    client.edit(APP, '@import "plain/api/plain.h"', '#include "beside.h"')
+    fix(client, APP, "replaced by @import", "write @import")
+    client.until(APP, lambda d: not d)
+    client.open("all.qrex")
+    client.edit("all.qrex", "translateOnly", "translateOnyl")
+    fix(client, "all.qrex", "translateOnyl", "write translateOnly")
+    client.until("all.qrex", lambda d: not d)
 
 
 def cpp(client):
@@ -156,6 +207,8 @@ def cpp(client):
     client.edit(APP, "int count", "circle.\n    int count")
     found = client.ask("textDocument/completion", client.place(APP, "circle.\n", 7))["items"]
     assert any(i["label"].strip().startswith("Getradius") for i in found), [i["label"] for i in found][:20]
+    # An editor that knows no snippets gets none: it would write what they hold.
+    assert not any("(" in i["textEdit"]["newText"] for i in found), found
     client.edit(APP, "circle.\n    int count", "int count")
     changes = client.ask("textDocument/rename", {**client.place(APP, "count = 1"), "newName": "total"})["changes"]
     edits = changes[uri_of(client.path(APP))]
@@ -192,15 +245,22 @@ def test_cpp_in_utf8(client):
 
 @session("clangd-19")
 def test_dying_clangd(client):
-    """It is started again, and knows what is open; who had asked is answered."""
+    """It dies every 50 edits: it is started again, and knows what is open; who had asked is answered; errors go on."""
     client.open(APP)
-    for _ in range(3):
+    for turn in range(1, 201):
+        client.edit(APP, f"count = {turn};", f"count = {turn + 1};")
+        if turn % 50 > 0:
+            continue
         holds(client.ask("textDocument/hover", client.place(APP, "size ="))["contents"]["value"], "double")
         children = subprocess.run(["pgrep", "-P", str(client.process.pid)], capture_output=True, text=True).stdout.split()
         equal(len(children), 1)
         waiting = client.start("textDocument/hover", client.place(APP, "size ="))
         os.kill(int(children[0]), signal.SIGKILL)
         client.wait(waiting)
+        client.edit(APP, "size > 3", "size > lost")
+        client.until(APP, lambda d: "lost" in str(errors(d)))
+        client.edit(APP, "size > lost", "size > 3")
+        client.until(APP, lambda d: not errors(d))
     holds(client.ask("textDocument/hover", client.place(APP, "size ="))["contents"]["value"], "double")
 
 

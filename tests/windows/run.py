@@ -13,43 +13,15 @@ import time
 from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
-ROOT = Path(__file__).resolve().parents[2]
-WINE = "/usr/lib/wine/wine64"
-WRAPPER = str(ROOT / "tests/windows/Qrex")
+import compiled
+from common import ROOT, WINE, WRAPPER, Count, run, text_of
+
 SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll", "rpcrt4.dll", "shell32.dll"}
 # End-to-end scripts of which tests need no compiler or shell in the run itself.
 SCRIPTS = ["init", "language", "messages", "questions", "schemas"]
 # What cannot pass under Wine, with the reason.
 KNOWN = dict(line.split(None, 1) for line in (ROOT / "tests/windows/skipped.txt").read_text().splitlines()
              if line and not line.startswith("#"))
-
-
-class Count:
-    def __init__(self, name):
-        self.name, self.passed, self.failed, self.skipped = name, 0, [], []
-
-    def take(self, label, failure):
-        if failure is None:
-            self.passed += 1
-        else:
-            self.failed.append(label)
-            print(f"FAILED {label}\n{failure}", flush=True)
-
-    def skip(self, label, reason):
-        self.skipped.append(label)
-        print(f"skipped {label}: {reason}", flush=True)
-
-    def end(self):
-        print(f"== {self.name}: {self.passed} passed, {len(self.failed)} failed, {len(self.skipped)} skipped", flush=True)
-
-
-def run(command, **options):
-    return subprocess.run(command, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=590,
-                          **options)
-
-
-def text_of(done):
-    return done.stdout.decode(errors="replace").replace("\r", "")
 
 
 def units(build):
@@ -89,43 +61,6 @@ def bytes_of_both(binary):
     if not found or found[2] != "0":
         count.take("bytes.py", text)
     return count
-
-
-# What the tour and its runtime become is compiled for Windows, and runs.
-def tour():
-    count = Count("an example compiled for Windows")
-    folder = Path(tempfile.mkdtemp(prefix="tour-"))
-    try:
-        shutil.copytree(ROOT / "examples/tour", folder / "examples/tour")
-        shutil.copytree(ROOT / "runtime", folder / "runtime")
-        place = folder / "examples/tour"
-        done = run([WRAPPER, "tour.qrex", "translateOnly=true"], cwd=place)
-        failure = text_of(done) if done.returncode else None
-        if not failure:
-            failure = compiled(place)
-        count.take("tour", failure)
-    finally:
-        shutil.rmtree(folder, ignore_errors=True)
-    return count
-
-
-def compiled(place):
-    translated = place / "qrexsource/x64/Debug"
-    sources = [path for path in sorted(translated.rglob("*.cpp"))]
-    includes = [f"-I{folder}" for folder in [translated, *sorted(path for path in translated.rglob("*") if path.is_dir())]]
-    compiler = ["x86_64-w64-mingw32-g++-posix", "-std=c++17", "-O0", "-w", *includes]
-
-    def compile_one(source):
-        return run([*compiler, "-c", str(source), "-o", str(source) + ".o"], cwd=place)
-    with ThreadPoolExecutor(2) as pool:
-        for done in pool.map(compile_one, sources):
-            if done.returncode:
-                return text_of(done)[:3000]
-    done = run([*compiler, "-static", *[f"{source}.o" for source in sources], "-lws2_32", "-o", "app.exe"], cwd=place)
-    if done.returncode:
-        return text_of(done)[:3000]
-    got, expected = text_of(run([WINE, "app.exe"], cwd=place)), (place / "expected.txt").read_text()
-    return None if got == expected else f"got\n{got}\nnot\n{expected}"
 
 
 SETTINGS = """virtualTree = { "tree" } workspaces = { "all.qrws" } config = "Debug" platform = "x64"
@@ -281,8 +216,8 @@ def cases(folder):
 def main():
     build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
     os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
-    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), tour, lambda: builds(build),
-              scripts]
+    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples,
+              compiled.runtime, lambda: builds(build), scripts]
     if len(sys.argv) > 3 and sys.argv[3]:
         groups.append(lambda: cases(Path(sys.argv[3]).resolve()))
     counts = []

@@ -73,3 +73,6 @@ xvector<DGNode const*> NodesOf(ReflectedClass const& record, void const* object,
 DGNode const* FindNode(ReflectedClass const& record, void const* object, std::string_view name);
 
 }  // namespace vesk
+
+// What stands above is defined here: a program that looks into no graph does not compile it.
+@import "Vesk/vxObject/src/parts/graph_view.h"

@@ -4,6 +4,7 @@
 #include <filesystem>
 
 #include "platform/streams.h"
+#include "platform/system.h"
 #include "platform/windows/api.h"
 #include "platform/windows/patience.h"
 
@@ -78,10 +79,10 @@ Result Stat(const std::string& path, FileInfo& info) {
   return {};
 }
 
+// The clock that files are stamped by may be a tick behind that of the system: that of a machine below, or of a share.
 int64_t CurrentStamp() {
-  FILETIME now;
-  GetSystemTimeAsFileTime(&now);
-  return FileTimeOf(now);
+  constexpr int64_t kSlowestTick = 100'000;  // 10 ms
+  return SystemFileTime() - kSlowestTick;
 }
 
 // The system has no documented calls that begin at an open folder.
@@ -250,7 +251,7 @@ Result SetWriteTime(const std::string& path, int64_t time) {
   return Result::OfCall(file && SetFileTime(file.Get(), nullptr, &stamp, &stamp));
 }
 
-Result StampNow(const std::string& path) { return SetWriteTime(path, CurrentStamp()); }
+Result StampNow(const std::string& path) { return SetWriteTime(path, SystemFileTime()); }
 
 Result FullPath(const std::string& path, std::string& out) {
   const std::wstring wide = Wide(path);

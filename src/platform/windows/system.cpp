@@ -12,7 +12,11 @@
 
 namespace qrex::platform {
 
-int64_t SystemFileTime() { return CurrentStamp(); }
+int64_t SystemFileTime() {
+  FILETIME now;
+  GetSystemTimeAsFileTime(&now);
+  return FileTimeOf(now);
+}
 
 uint64_t PerformanceCounter() {
   LARGE_INTEGER count;

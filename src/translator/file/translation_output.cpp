@@ -65,8 +65,8 @@ void SetTranslated(ScannedFile& file, int64_t time) {
 // The clock of stamps first passes the begin of the run: a source that was saved just ahead of it could bear the stamp
 // of its translation, and be stale again in the next run.
 int64_t ReadingTime(const ConfigSettings& settings) {
-  constexpr int kMostWaits = 100;  // of a fraction of a tick each
-  for (int waits = 0; CurrentStamp() <= settings.begun && waits < kMostWaits; ++waits) {
+  const auto end = std::chrono::steady_clock::now() + std::chrono::milliseconds(50);  // a clock may be set back
+  while (CurrentStamp() <= settings.begun && std::chrono::steady_clock::now() < end) {
     std::this_thread::sleep_for(std::chrono::microseconds(200));
   }
   return CurrentStamp();

@@ -1,6 +1,5 @@
 // What an ArchiveView consists of: the parts as nodes of a tree, in the order of the bytes, and what was read.
 
-@import "Vesk/vxObject/DumpArchive.h"
 @import "Vesk/vxObject/ValueTypes.h"
 @import "Vesk/vxObject/src/shared.h"
 

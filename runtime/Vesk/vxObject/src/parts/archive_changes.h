@@ -4,7 +4,7 @@
 
 namespace vesk {
 
-namespace {
+inline namespace parts {
 
 // Which elements of two lists are the same: pairs of positions that ascend on both sides.
 typedef xvector<std::pair<std::size_t, std::size_t>> Matches;
@@ -284,9 +284,9 @@ class Comparer {
   xvector<std::pair<uint32, uint32>> m_pairs;  // of objects, to be compared
 };
 
-}  // namespace
+}  // namespace parts
 
-xvector<ArchiveChange> CompareArchives(ArchiveView const& old, ArchiveView const& now) {
+inline xvector<ArchiveChange> CompareArchives(ArchiveView const& old, ArchiveView const& now) {
   Comparer comparer(old.Inside(), now.Inside());
   if (!comparer.AreAlike()) return {{ArchiveChange::Changed, xstring(), xstring(), old.Class(), now.Class()}};
   return comparer.Compare();

@@ -6,13 +6,13 @@ namespace vesk {
 
 // --- Layouts
 
-ArchiveWalker::Layout const& ArchiveWalker::LayoutOf(ReflectedClass const& record) {
+inline ArchiveWalker::Layout const& ArchiveWalker::LayoutOf(ReflectedClass const& record) {
   const auto [at, isNew] = m_layouts.try_emplace(&record);
   if (isNew) FillLayout(at->second, record);
   return at->second;
 }
 
-ReflectedClass const* ModelOf(ReflectedClass const& record) {
+inline ReflectedClass const* ModelOf(ReflectedClass const& record) {
   if (record.m_flags & CF_REFERENCES_MODEL) {
     return Find<ReflectedClass>(record.m_modelFields[record.m_numModelFields - 1].m_name);
   }
@@ -20,7 +20,7 @@ ReflectedClass const* ModelOf(ReflectedClass const& record) {
 }
 
 // The fields stand in the order in which they are archived, those that were dropped included.
-void ArchiveWalker::FillLayout(Layout& layout, ReflectedClass const& record) {
+inline void ArchiveWalker::FillLayout(Layout& layout, ReflectedClass const& record) {
   ReflectedClass const* const model = ModelOf(record);
   layout.m_target = TargetOf(record);
   layout.m_modelTarget = model ? TargetOf(*model) : nullptr;
@@ -62,7 +62,7 @@ struct ArchiveWalker::Scratch {
 
 // A class with a model in its head does, one with a model in its body does not, and its record does not tell which it
 // is. What it holds is not read: that would be too deep.
-bool ArchiveWalker::BeginsWithRelease(ReflectedClass const& record) {
+inline bool ArchiveWalker::BeginsWithRelease(ReflectedClass const& record) {
   if (!record.m_ops.m_construct || !record.m_ops.m_destruct || !record.m_ops.m_deserialise) return true;
   InputArchive first(xvector<octet_t>{0});
   first.m_limits.m_depth = 1;
@@ -76,10 +76,10 @@ bool ArchiveWalker::BeginsWithRelease(ReflectedClass const& record) {
 
 // --- Reading
 
-namespace {
+inline namespace parts {
 
 // What an object that is not there leaves in its place.
-NumberedObject NoObject() {
+inline NumberedObject NoObject() {
   NumberedObject none;
   none.m_type = &typeid(void);
   none.m_isRead = true;
@@ -112,7 +112,7 @@ class FirstObjects {
   xvector<NumberedObject> m_others;
 };
 
-}  // namespace
+}  // namespace parts
 
 // What was made is destroyed ahead of the objects that it refers to.
 template <typename Read>
@@ -125,7 +125,7 @@ ArchiveWalker::Extent ArchiveWalker::Probe(Read read) {
   return extent;
 }
 
-ArchiveWalker::Extent ArchiveWalker::ProbeValue(TypeOps const& ops) {
+inline ArchiveWalker::Extent ArchiveWalker::ProbeValue(TypeOps const& ops) {
   return Probe([this, &ops] {
     const Scratch scratch(ops);
     ops.m_deserialise(m_archive, scratch.m_value, 0, 1);
@@ -133,7 +133,7 @@ ArchiveWalker::Extent ArchiveWalker::ProbeValue(TypeOps const& ops) {
 }
 
 // A class without a model has no operations of archives, though it be an object that has them.
-ArchiveWalker::Extent ArchiveWalker::ProbeClass(ReflectedClass const& record) {
+inline ArchiveWalker::Extent ArchiveWalker::ProbeClass(ReflectedClass const& record) {
   if (record.m_ops.m_deserialise || !record.m_create) return ProbeValue(record.m_ops);
   return Probe([this, &record] {
     struct Made {
@@ -148,7 +148,7 @@ ArchiveWalker::Extent ArchiveWalker::ProbeClass(ReflectedClass const& record) {
 }
 
 // As far as they were read.
-xvector<ArchivedObject> ArchiveWalker::ObjectsFrom(std::size_t first) {
+inline xvector<ArchivedObject> ArchiveWalker::ObjectsFrom(std::size_t first) {
   xvector<ArchivedObject> objects;
   auto const& list = m_archive.m_objects.m_list;
   for (std::size_t i = first; i < list.size(); ++i) {
@@ -177,7 +177,7 @@ bool ArchiveWalker::ReadAhead(Read read) {
 }
 
 // An archive of before has the contents within each other: then all is read at once.
-void ArchiveWalker::ReadRoot() {
+inline void ArchiveWalker::ReadRoot() {
   ReadAhead([this] {
     pref<IPersistable> root;
     m_archive >> root;

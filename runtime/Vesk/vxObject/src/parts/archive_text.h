@@ -5,7 +5,7 @@
 
 namespace vesk {
 
-uint32 CompactAt(octet_t const* bytes) {
+inline uint32 CompactAt(octet_t const* bytes) {
   struct Bytes {
     void Read(void* to, std::size_t size) {
       std::memcpy(to, m_at, size);
@@ -18,31 +18,31 @@ uint32 CompactAt(octet_t const* bytes) {
 
 // --- Values
 
-namespace {
+inline namespace parts {
 
-std::size_t SizeOfCompact(octet_t first) {
+inline std::size_t SizeOfCompact(octet_t first) {
   std::size_t size = 1;
   while (size < 5 && (first & 0x80 >> (size - 1))) ++size;
   return size;
 }
 
-xstring CountText(std::size_t count, ConstStringZ unit) {
+inline xstring CountText(std::size_t count, ConstStringZ unit) {
   return vxMakeString(count << ' ' << unit << (count == 1 ? "" : "s"));
 }
 
-xstring Shortened(std::string text, std::size_t size, std::size_t shown, ConstStringZ unit) {
+inline xstring Shortened(std::string text, std::size_t size, std::size_t shown, ConstStringZ unit) {
   if (shown < size) text += "... (" + CountText(size, unit) + ')';
   return xstring(std::move(text));
 }
 
-xstring QuotedText(octet_t const* bytes, std::size_t size, std::size_t most) {
+inline xstring QuotedText(octet_t const* bytes, std::size_t size, std::size_t most) {
   std::string text;
   std::size_t shown = std::min(size, most);
   while (shown < size && shown > 0 && (bytes[shown] & 0xC0) == 0x80) --shown;
   PutJsonString(text, std::string_view(reinterpret_cast<char const*>(bytes), shown), true);
   return Shortened(std::move(text), size, shown, "byte");
 }
-xstring QuotedText16(octet_t const* bytes, std::size_t count, std::size_t most) {
+inline xstring QuotedText16(octet_t const* bytes, std::size_t count, std::size_t most) {
   std::u16string units(std::min(count, most), u'\0');
   std::memcpy(&units[0], bytes, units.size() * sizeof(char16_t));
   if (ArchivesSwapBytes) SwapBytes(&units[0], units.size(), sizeof(char16_t));
@@ -51,7 +51,7 @@ xstring QuotedText16(octet_t const* bytes, std::size_t count, std::size_t most) 
   return Shortened(std::move(text), count, units.size(), "unit");
 }
 
-xstring ScalarText(ValueType const& type, octet_t const* bytes) {
+inline xstring ScalarText(ValueType const& type, octet_t const* bytes) {
   if (type.m_kind == VK_CHAR) return type.m_size == 1 ? QuotedText(bytes, 1, 1) : QuotedText16(bytes, 1, 1);
   alignas(16) octet_t value[16];
   std::memcpy(value, bytes, type.m_size);
@@ -59,13 +59,13 @@ xstring ScalarText(ValueType const& type, octet_t const* bytes) {
   return TextOf([&](xostream& os) { type.m_ops->m_print(os, value); });
 }
 
-xstring EnumText(ValueType const& type, octet_t const* bytes) {
+inline xstring EnumText(ValueType const& type, octet_t const* bytes) {
   return TextOf([&](xostream& os) { PrintEnum(os, type.m_enum, static_cast<int32>(CompactAt(bytes))); });
 }
 
-}  // namespace
+}  // namespace parts
 
-xstring ArchiveValueText(ArchiveView::Content const& content, ValueType const& type, octet_t const* bytes) {
+inline xstring ArchiveValueText(ArchiveView::Content const& content, ValueType const& type, octet_t const* bytes) {
   if (type.m_kind == VK_ENUM) return EnumText(type, bytes);
   if (type.m_kind != VK_TEXT) return ScalarText(type, bytes);
   const std::size_t count = CompactAt(bytes);
@@ -76,10 +76,10 @@ xstring ArchiveValueText(ArchiveView::Content const& content, ValueType const& t
 
 // --- Nodes
 
-namespace {
+inline namespace parts {
 
 // As a key stands in a path: without quotes.
-xstring KeyText(ArchiveView::Content const& content, uint32 entry) {
+inline xstring KeyText(ArchiveView::Content const& content, uint32 entry) {
   ArchiveNode const* const key = entry + 1 < content.m_nodes.size() && content.m_nodes[entry + 1].m_parent == entry
                                      ? &content.m_nodes[entry + 1]
                                      : nullptr;
@@ -93,12 +93,12 @@ xstring KeyText(ArchiveView::Content const& content, uint32 entry) {
   return LimitText(text, 60);
 }
 
-xstring ReferenceText(ArchiveNode const& node) {
+inline xstring ReferenceText(ArchiveNode const& node) {
   if (node.m_detail == 0) return "null";
   return vxMakeString('#' << node.m_detail << (node.m_isNew ? ", new" : ""));
 }
 
-xstring ReleaseText(ArchiveView::Content const& content, ArchiveNode const& node) {
+inline xstring ReleaseText(ArchiveView::Content const& content, ArchiveNode const& node) {
   const uint32 release = CompactAt(content.BytesOf(node));
   return TextOf([&](xostream& os) {
     os << release;
@@ -111,9 +111,9 @@ xstring ReleaseText(ArchiveView::Content const& content, ArchiveNode const& node
   });
 }
 
-}  // namespace
+}  // namespace parts
 
-xstring ArchivePathText(ArchiveView::Content const& content, uint32 node) {
+inline xstring ArchivePathText(ArchiveView::Content const& content, uint32 node) {
   xvector<uint32> way;
   for (uint32 at = node; at != kNoNode; at = content.m_nodes[at].m_parent) {
     way.push_back(at);
@@ -133,7 +133,7 @@ xstring ArchivePathText(ArchiveView::Content const& content, uint32 node) {
   });
 }
 
-xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& node) {
+inline xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& node) {
   octet_t const* const bytes = content.BytesOf(node);
   switch (node.m_kind) {
     case AP_MARK:
@@ -160,7 +160,7 @@ xstring ArchiveNodeText(ArchiveView::Content const& content, ArchiveNode const& 
   return xstring();
 }
 
-xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node) {
+inline xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node) {
   ArchiveNode const& of = content.m_nodes[node];
   if (of.m_kind != AP_GROUP) {
     return of.m_isBlock ? CountText(of.m_size / of.m_type->m_size, "element") : ArchiveNodeText(content, of);
@@ -177,10 +177,10 @@ xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node) {
 
 // --- Parts
 
-namespace {
+inline namespace parts {
 
 // Its type, where it has one.
-xstring WhatOf(ArchiveNode const& node) {
+inline xstring WhatOf(ArchiveNode const& node) {
   static constexpr ConstStringZ names[] = {"project", "class", "type"};
   switch (node.m_kind) {
     case AP_MARK:
@@ -199,7 +199,7 @@ xstring WhatOf(ArchiveNode const& node) {
   }
 }
 
-ArchivePart PartOf(ArchiveView::Content const& content, uint32 index, std::size_t part) {
+inline ArchivePart PartOf(ArchiveView::Content const& content, uint32 index, std::size_t part) {
   ArchiveNode const& node = content.m_nodes[index];
   ArchivePart shown;
   shown.m_kind = node.m_kind;
@@ -227,7 +227,7 @@ ArchivePart PartOf(ArchiveView::Content const& content, uint32 index, std::size_
   return shown;
 }
 
-void FindFirstParts(ArchiveView::Content& content) {
+inline void FindFirstParts(ArchiveView::Content& content) {
   std::size_t count = 0;
   content.m_firstParts.reserve(content.m_nodes.size() + 1);
   for (ArchiveNode const& node : content.m_nodes) {
@@ -252,7 +252,7 @@ void EachPart(ArchiveView::Content const& content, std::size_t first, std::size_
 
 constexpr std::size_t kBytesPerLine = 8;
 
-void PrintBytes(std::string& line, octet_t const* bytes, std::size_t size) {
+inline void PrintBytes(std::string& line, octet_t const* bytes, std::size_t size) {
   for (std::size_t i = 0; i < kBytesPerLine; ++i) {
     if (i < size) {
       line += kHexDigits[bytes[i] >> 4];
@@ -264,17 +264,18 @@ void PrintBytes(std::string& line, octet_t const* bytes, std::size_t size) {
   }
 }
 
-std::string OffsetText(std::size_t offset) {
+inline std::string OffsetText(std::size_t offset) {
   std::string text;
   for (int shift = offset > 0xFFFFFFFF ? 60 : 28; shift >= 0; shift -= 4) text += kHexDigits[offset >> shift & 15];
   return text + "  ";
 }
 
-void Pad(std::string& line, std::size_t to) { line.resize(std::max(to, line.size() + 2), ' '); }
+inline void Pad(std::string& line, std::size_t to) { line.resize(std::max(to, line.size() + 2), ' '); }
 
 constexpr std::size_t kPathColumn = 36, kTypeColumn = 64, kValueColumn = 84;
 
-void PrintLine(xostream& os, std::string line, std::string_view path, std::string_view type, std::string_view value) {
+inline void PrintLine(xostream& os, std::string line, std::string_view path, std::string_view type,
+                      std::string_view value) {
   line.resize(kPathColumn, ' ');
   line += path;
   Pad(line, kTypeColumn);
@@ -285,7 +286,7 @@ void PrintLine(xostream& os, std::string line, std::string_view path, std::strin
   os << line << '\n';
 }
 
-void PrintPart(xostream& os, ArchivePart const& part, octet_t const* bytes) {
+inline void PrintPart(xostream& os, ArchivePart const& part, octet_t const* bytes) {
   std::string line = OffsetText(part.m_offset);
   const bool isGroup = part.m_kind == AP_GROUP;
   if (!isGroup) PrintBytes(line, bytes, part.m_size);
@@ -299,33 +300,33 @@ void PrintPart(xostream& os, ArchivePart const& part, octet_t const* bytes) {
   }
 }
 
-}  // namespace
+}  // namespace parts
 
 // --- The view
 
-ArchiveView::Content::Content(xvector<octet_t> bytes, ArchiveOptions const& options) : m_options(options) {
+inline ArchiveView::Content::Content(xvector<octet_t> bytes, ArchiveOptions const& options) : m_options(options) {
   if (bytes.size() > options.m_limits.m_bytes) m_error = "archive larger than allowed";
   m_archive.m_bytes = std::move(bytes);
   m_archive.m_limits = options.m_limits;
   m_archive.m_objects.m_allow = options.m_allow;
   m_archive.m_objects.m_allowType = options.m_allowType;
 }
-ArchiveView::Content::~Content() {
+inline ArchiveView::Content::~Content() {
   m_hold.reset();
   m_archive.m_objects.Destroy();
 }
 
-ArchiveView::ArchiveView(ArchiveView&&) noexcept = default;
-ArchiveView& ArchiveView::operator=(ArchiveView&&) noexcept = default;
-ArchiveView::~ArchiveView() = default;
+inline ArchiveView::ArchiveView(ArchiveView&&) noexcept = default;
+inline ArchiveView& ArchiveView::operator=(ArchiveView&&) noexcept = default;
+inline ArchiveView::~ArchiveView() = default;
 
-ArchiveView::ArchiveView(xvector<octet_t> bytes, ArchiveOptions const& options)
+inline ArchiveView::ArchiveView(xvector<octet_t> bytes, ArchiveOptions const& options)
     : m_content(std::make_unique<Content>(std::move(bytes), options)) {
   ArchiveWalker(*m_content).Objects();
   FindFirstParts(*m_content);
 }
-ArchiveView::ArchiveView(ReflectedType const& type, TypeOps const& ops, xvector<octet_t> bytes,
-                         ArchiveOptions const& options)
+inline ArchiveView::ArchiveView(ReflectedType const& type, TypeOps const& ops, xvector<octet_t> bytes,
+                                ArchiveOptions const& options)
     : m_content(std::make_unique<Content>(std::move(bytes), options)) {
   m_content->m_declared = type;
   m_content->m_type = &m_content->m_types.Of(type);
@@ -334,7 +335,7 @@ ArchiveView::ArchiveView(ReflectedType const& type, TypeOps const& ops, xvector<
   FindFirstParts(*m_content);
 }
 
-ArchiveView ArchiveView::OfType(xstring const& name, xvector<octet_t> bytes, ArchiveOptions const& options) {
+inline ArchiveView ArchiveView::OfType(xstring const& name, xvector<octet_t> bytes, ArchiveOptions const& options) {
   ValueTypes types;
   ValueType const* const type = JsonTypeOfName(types, name);
   if (!type || !type->m_ops) throw AccessError(NotRegistered("type", name));
@@ -343,26 +344,26 @@ ArchiveView ArchiveView::OfType(xstring const& name, xvector<octet_t> bytes, Arc
   return ArchiveView(reflected, *type->m_ops, std::move(bytes), options);
 }
 
-xstring const& ArchiveView::Error() const { return m_content->m_error; }
-xvector<octet_t> const& ArchiveView::Bytes() const { return m_content->m_archive.m_bytes; }
-xvector<ArchiveRelease> const& ArchiveView::Releases() const { return m_content->m_releases; }
+inline xstring const& ArchiveView::Error() const { return m_content->m_error; }
+inline xvector<octet_t> const& ArchiveView::Bytes() const { return m_content->m_archive.m_bytes; }
+inline xvector<ArchiveRelease> const& ArchiveView::Releases() const { return m_content->m_releases; }
 
-xstring ArchiveView::Class() const {
+inline xstring ArchiveView::Class() const {
   if (m_content->m_type) return m_content->m_type->m_text;
   auto const& objects = m_content->m_objects;
   return objects.empty() || !objects[0].m_type ? xstring() : objects[0].m_type->m_text;
 }
 
-std::size_t ArchiveView::CountParts() const { return m_content->m_firstParts.back(); }
+inline std::size_t ArchiveView::CountParts() const { return m_content->m_firstParts.back(); }
 
-xvector<ArchivePart> ArchiveView::Parts(std::size_t first, std::size_t count) const {
+inline xvector<ArchivePart> ArchiveView::Parts(std::size_t first, std::size_t count) const {
   xvector<ArchivePart> parts;
   if (first < CountParts())
     EachPart(*m_content, first, count, [&](ArchivePart part) { parts.push_back(std::move(part)); });
   return parts;
 }
 
-void ArchiveView::Print(xostream& os) const {
+inline void ArchiveView::Print(xostream& os) const {
   os << (Class().empty() ? xstring("archive") : Class()) << ", " << Bytes().size() << " bytes\n";
   PrintLine(os, "offset    bytes", "path", "type", "value");
   if (CountParts() > 0) {
@@ -378,7 +379,7 @@ void ArchiveView::Print(xostream& os) const {
   }
 }
 
-xstring DumpArchive(xvector<octet_t> bytes, ArchiveOptions const& options) {
+inline xstring DumpArchive(xvector<octet_t> bytes, ArchiveOptions const& options) {
   return TextOf([&](xostream& os) { ArchiveView(std::move(bytes), options).Print(os); });
 }
 

@@ -5,9 +5,9 @@
 
 namespace vesk {
 
-namespace {
+inline namespace parts {
 
-Value ObjectToday(ArchiveView::Content const& content, std::size_t object) {
+inline Value ObjectToday(ArchiveView::Content const& content, std::size_t object) {
   auto const& list = content.m_archive.m_objects.m_list;
   if (object >= list.size() || !list[object].m_self) return Value();
   if (ReflectedClass const* record = ClassOf(ptr<IPersistable>(list[object].m_persistable))) {
@@ -17,7 +17,7 @@ Value ObjectToday(ArchiveView::Content const& content, std::size_t object) {
   return type && type->m_class ? Value(*type->m_class, list[object].m_self) : Value();
 }
 
-xstring ShortTextOf(Value const& value, std::size_t most) {
+inline xstring ShortTextOf(Value const& value, std::size_t most) {
   const EValueKind kind = value.Kind();
   if (kind == VK_LIST || kind == VK_SET || kind == VK_MAP)
     return vxMakeString(value.Count() << (value.Count() == 1 ? " element" : " elements"));
@@ -127,16 +127,16 @@ class Evolution {
   xvector<ArchiveChange> m_changes;
 };
 
-}  // namespace
+}  // namespace parts
 
-Value ArchiveView::Today() const {
+inline Value ArchiveView::Today() const {
   Content const& content = *m_content;
   if (!content.m_isWhole) return Value();
   return content.m_type ? Value(content.m_declared, content.m_value) : ObjectToday(content, 0);
 }
 
 // A project that the head does not name wrote its first release.
-static bool IsOld(ArchiveView::Content const& content) {
+inline bool IsOld(ArchiveView::Content const& content) {
   for (auto const& [target, release] : content.m_archive.m_releases) {
     if (target->m_latestModel && release < LastRelease(*target->m_latestModel)) return true;
   }
@@ -145,7 +145,7 @@ static bool IsOld(ArchiveView::Content const& content) {
   });
 }
 
-xvector<ArchiveChange> ArchiveView::Evolved() const {
+inline xvector<ArchiveChange> ArchiveView::Evolved() const {
   if (!m_content->m_isWhole || !IsOld(*m_content)) return {};
   return Evolution(*m_content).Find();
 }

@@ -10,11 +10,11 @@ constexpr std::size_t kLeastStack = 128 * 1024;
 
 // --- Parts
 
-ArchiveWalker::Mark ArchiveWalker::Here() const {
+inline ArchiveWalker::Mark ArchiveWalker::Here() const {
   return {m_archive.m_position,      m_covered,           m_content.m_nodes.size(), m_content.m_objects.size(),
           m_archive.m_emptyElements, m_archive.m_releases};
 }
-void ArchiveWalker::GoBack(Mark const& mark) {
+inline void ArchiveWalker::GoBack(Mark const& mark) {
   m_archive.m_position = mark.m_position;
   m_archive.m_emptyElements = mark.m_emptyElements;
   m_archive.m_releases = mark.m_releases;
@@ -24,7 +24,7 @@ void ArchiveWalker::GoBack(Mark const& mark) {
 }
 
 // One place is kept for what is left over.
-ArchiveNode* ArchiveWalker::Add(EArchivePart kind, ValueType const* type, Step step) {
+inline ArchiveNode* ArchiveWalker::Add(EArchivePart kind, ValueType const* type, Step step) {
   auto& nodes = m_content.m_nodes;
   if (nodes.size() + 1 >= std::min<std::size_t>(m_content.m_options.m_parts, kNoNode)) return nullptr;
   ArchiveNode node;
@@ -39,7 +39,7 @@ ArchiveNode* ArchiveWalker::Add(EArchivePart kind, ValueType const* type, Step s
   nodes.push_back(node);
   return &nodes.back();
 }
-ArchiveNode* ArchiveWalker::AddLeaf(EArchivePart kind, ValueType const* type, Step step) {
+inline ArchiveNode* ArchiveWalker::AddLeaf(EArchivePart kind, ValueType const* type, Step step) {
   ArchiveNode* const node = Add(kind, type, step);
   if (!node) return nullptr;
   node->m_size = m_archive.m_position - m_covered;
@@ -47,7 +47,7 @@ ArchiveNode* ArchiveWalker::AddLeaf(EArchivePart kind, ValueType const* type, St
   return node;
 }
 
-void ArchiveWalker::Finish() {
+inline void ArchiveWalker::Finish() {
   m_content.m_isWhole = m_isRead && m_content.m_error.empty();
   if (m_covered == m_archive.m_bytes.size()) return;
   ArchiveNode rest;
@@ -60,7 +60,7 @@ void ArchiveWalker::Finish() {
 
 // --- Values
 
-void ArchiveWalker::Walk(ValueType const& type, Step step) {
+inline void ArchiveWalker::Walk(ValueType const& type, Step step) {
   t_reading.m_target = nullptr;
   switch (type.m_kind) {
     case VK_NONE:
@@ -90,38 +90,38 @@ void ArchiveWalker::Walk(ValueType const& type, Step step) {
   }
 }
 
-namespace {
+inline namespace parts {
 
-bool IsScalar(ValueType const& type) { return type.m_kind >= VK_BOOL && type.m_kind <= VK_CHAR; }
+inline bool IsScalar(ValueType const& type) { return type.m_kind >= VK_BOOL && type.m_kind <= VK_CHAR; }
 
-void CheckBools(ValueType const& type, octet_t const* bytes, std::size_t count) {
+inline void CheckBools(ValueType const& type, octet_t const* bytes, std::size_t count) {
   if (type.m_kind != VK_BOOL) return;
   if (std::any_of(bytes, bytes + count, [](octet_t byte) { return byte > 1; })) FailArchive("not a bool");
 }
 
 // As LeastBytes has it of the C++ type.
-std::size_t LeastBytesOf(ValueType const& type) {
+inline std::size_t LeastBytesOf(ValueType const& type) {
   if (IsScalar(type)) return type.m_size;
   return type.m_kind == VK_CLASS || type.m_kind == VK_VARIANT || type.m_kind == VK_OPENVARIANT ? 0 : 1;
 }
-std::size_t LeastBytesOfEntry(ValueType const& container) {
+inline std::size_t LeastBytesOfEntry(ValueType const& container) {
   return LeastBytesOf(*container.m_item) + (container.m_key ? LeastBytesOf(*container.m_key) : 0);
 }
 
-}  // namespace
+}  // namespace parts
 
-void ArchiveWalker::WalkScalar(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkScalar(ValueType const& type, Step step) {
   CheckBools(type, m_archive.Take(type.m_size), 1);
   AddLeaf(AP_VALUE, &type, step);
 }
 
-void ArchiveWalker::WalkText(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkText(ValueType const& type, Step step) {
   const std::size_t size = type.m_code == RC_STRING16 ? sizeof(char16) : sizeof(char8);
   m_archive.Take(ReadCount(m_archive, size) * size);
   AddLeaf(AP_VALUE, &type, step);
 }
 
-void ArchiveWalker::WalkEnum(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkEnum(ValueType const& type, Step step) {
   const int32 number = static_cast<int32>(ReadCompact(m_archive));
   if (type.m_enum && number != 0 && !m_archive.m_limits.m_anyEnumNumber && !FindLabel(*type.m_enum, number)) {
     FailArchive("number without a label in an enumeration");
@@ -129,20 +129,20 @@ void ArchiveWalker::WalkEnum(ValueType const& type, Step step) {
   AddLeaf(AP_VALUE, &type, step);
 }
 
-xstring ArchiveWalker::TakeText() {
+inline xstring ArchiveWalker::TakeText() {
   const std::size_t count = ReadCount(m_archive, 1);
   return xstring(std::string(reinterpret_cast<char const*>(m_archive.Take(count)), count));
 }
 
 // --- Classes
 
-void ArchiveWalker::WalkClass(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkClass(ValueType const& type, Step step) {
   const ReadingScope scope(m_archive);
   if (StackLeft() < kLeastStack) FailArchive("values nested too deeply in an archive");
   WalkOpened(type, step);
 }
 
-void ArchiveWalker::WalkOpened(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkOpened(ValueType const& type, Step step) {
   const Group group(*this, &type, step);
   Layout const& layout = LayoutOf(*type.m_class);
   if (!layout.m_isKnown) return WalkBytes(ProbeClass(*type.m_class), m_content.m_objects.size());
@@ -150,7 +150,7 @@ void ArchiveWalker::WalkOpened(ValueType const& type, Step step) {
 }
 
 // What stands behind a field without a record is not known: it takes up the rest of the extent.
-void ArchiveWalker::WalkFields(Layout const& layout, Extent const& extent) {
+inline void ArchiveWalker::WalkFields(Layout const& layout, Extent const& extent) {
   const std::size_t firstMentioned = m_content.m_objects.size();
   if (layout.m_hasRelease) {
     const std::size_t position = m_archive.m_position;
@@ -168,13 +168,13 @@ void ArchiveWalker::WalkFields(Layout const& layout, Extent const& extent) {
   }
 }
 
-void ArchiveWalker::AddRelease(XTarget const* target) {
+inline void ArchiveWalker::AddRelease(XTarget const* target) {
   ArchiveNode* const node = AddLeaf(AP_RELEASE, nullptr, {EPathStep::None, target ? target->m_name : nullptr, 0});
   if (node) node->m_detail = target ? static_cast<uint32>(target->m_rsn) : kNoNode;
 }
 
 // To the end of an extent, some of whose objects may have been walked.
-void ArchiveWalker::WalkBytes(Extent const& extent, std::size_t firstMentioned, Step step) {
+inline void ArchiveWalker::WalkBytes(Extent const& extent, std::size_t firstMentioned, Step step) {
   auto& objects = m_content.m_objects;
   if (m_archive.m_position > extent.m_end || objects.size() - firstMentioned > extent.m_mentioned.size()) {
     FailArchive("not laid out as its record tells");
@@ -188,7 +188,7 @@ void ArchiveWalker::WalkBytes(Extent const& extent, std::size_t firstMentioned, 
 
 // --- Containers
 
-void ArchiveWalker::WalkContainer(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkContainer(ValueType const& type, Step step) {
   const Group group(*this, &type, step);
   const std::size_t count = ReadCount(m_archive, LeastBytesOfEntry(type));
   AddLeaf(AP_COUNT);
@@ -199,13 +199,13 @@ void ArchiveWalker::WalkContainer(ValueType const& type, Step step) {
   WalkEntries(type, count);
 }
 
-void ArchiveWalker::WalkBlock(ValueType const& item, std::size_t count) {
+inline void ArchiveWalker::WalkBlock(ValueType const& item, std::size_t count) {
   if (count == 0) return;
   CheckBools(item, m_archive.Take(count * item.m_size), count);
   if (ArchiveNode* node = AddLeaf(AP_VALUE, &item, {EPathStep::Element, nullptr, 0})) node->m_isBlock = true;
 }
 
-void ArchiveWalker::WalkEntries(ValueType const& type, std::size_t count) {
+inline void ArchiveWalker::WalkEntries(ValueType const& type, std::size_t count) {
   const bool mayBeEmpty = LeastBytesOfEntry(type) == 0;
   for (std::size_t i = 0; i < count; ++i) {
     const std::size_t position = m_archive.m_position;
@@ -224,7 +224,7 @@ void ArchiveWalker::WalkEntries(ValueType const& type, std::size_t count) {
 // --- Variants
 
 // An item without a record is read by the variant, which begins with the tag.
-void ArchiveWalker::WalkVariant(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkVariant(ValueType const& type, Step step) {
   const ReadingScope scope(m_archive);
   if (StackLeft() < kLeastStack) FailArchive("values nested too deeply in an archive");
   const Group group(*this, &type, step);
@@ -241,7 +241,7 @@ void ArchiveWalker::WalkVariant(ValueType const& type, Step step) {
   WalkBytes(ProbeValue(*type.m_ops), m_content.m_objects.size());
 }
 
-void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
   const ReadingScope scope(m_archive);
   if (StackLeft() < kLeastStack) FailArchive("values nested too deeply in an archive");
   const Group group(*this, &type, step);
@@ -261,7 +261,7 @@ void ArchiveWalker::WalkOpenVariant(ValueType const& type, Step step) {
 
 // --- References
 
-void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
+inline void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
   auto& objects = m_content.m_objects;
   const std::size_t known = objects.size();
   const std::size_t number = ReadCompact(m_archive);
@@ -286,11 +286,11 @@ void ArchiveWalker::WalkReference(ValueType const& type, Step step) {
   }
 }
 
-void ArchiveWalker::AddName(EArchiveName what, Step step) {
+inline void ArchiveWalker::AddName(EArchiveName what, Step step) {
   if (ArchiveNode* node = AddLeaf(AP_NAME, nullptr, step)) node->m_detail = what;
 }
 
-ValueType const* ArchiveWalker::WalkClassName(Step step) {
+inline ValueType const* ArchiveWalker::WalkClassName(Step step) {
   const xstring name = TakeText();
   AddName(AN_CLASS, step);
   ReflectedClass const* const record = Find<ReflectedClass>(name);
@@ -301,7 +301,7 @@ ValueType const* ArchiveWalker::WalkClassName(Step step) {
 }
 
 // A plain struct is read by `>>`, an object is not.
-void ArchiveWalker::WalkContent(std::size_t object) {
+inline void ArchiveWalker::WalkContent(std::size_t object) {
   if (StackLeft() < kLeastStack) FailArchive("objects nested too deeply in an archive");
   m_content.m_objects[object].m_isWalked = true;
   ValueType const* const type = m_content.m_objects[object].m_type;
@@ -330,7 +330,7 @@ void ArchiveWalker::WalkAsRead(ValueType const* type, Step step, Action walk) {
   WalkBytes(extent, mark.m_objects);
 }
 
-void ArchiveWalker::Head() {
+inline void ArchiveWalker::Head() {
   if (m_archive.Remaining() == 0 || m_archive.m_bytes[0] != ObjectMark[0]) return;
   std::exception_ptr error;
   try {
@@ -350,7 +350,7 @@ void ArchiveWalker::Head() {
   if (error) std::rethrow_exception(error);
 }
 
-void ArchiveWalker::HeadReleases(bool occurs) {
+inline void ArchiveWalker::HeadReleases(bool occurs) {
   const xvector<XTarget const*> targets = AllTargets();
   std::size_t count = ReadCount(m_archive, 2);
   AddLeaf(AP_COUNT, nullptr, {EPathStep::None, occurs ? "whose models occur" : "others", 0});
@@ -366,7 +366,7 @@ void ArchiveWalker::HeadReleases(bool occurs) {
   }
 }
 
-void ArchiveWalker::Objects() {
+inline void ArchiveWalker::Objects() {
   try {
     if (!m_content.m_error.empty()) return Finish();
     Head();
@@ -383,7 +383,7 @@ void ArchiveWalker::Objects() {
   Finish();
 }
 
-void ArchiveWalker::WalkContentAsRead(std::size_t object) {
+inline void ArchiveWalker::WalkContentAsRead(std::size_t object) {
   if (m_content.m_objects[object].m_isWalked) return;
   if (!ReadAhead([this, object] { ReadContent(m_archive, object); })) return WalkContent(object);
   WalkAsRead(m_content.m_objects[object].m_type, {EPathStep::Object, nullptr, static_cast<uint32>(object + 1)},
@@ -391,7 +391,7 @@ void ArchiveWalker::WalkContentAsRead(std::size_t object) {
   m_content.m_objects[object].m_isWalked = true;
 }
 
-void ArchiveWalker::Value() {
+inline void ArchiveWalker::Value() {
   ValueType const& type = *m_content.m_type;
   TypeOps const& ops = *m_content.m_ops;
   try {

@@ -1,7 +1,6 @@
 // Graphs as they are shown. What generated text named a node after is in the name of its type:
 // "kinds::Cell::Depnode_twice", "kinds::Counted<vesk::IObjectBaseMixin<kinds::Cell, vesk::EmptyBase> >::Depnode_more".
 
-@import "Vesk/vxObject/GraphView.h"
 @import "Vesk/vxObject/ValueTypes.h"
 @import "Vesk/vxObject/src/shared.h"
 
@@ -16,15 +15,9 @@
 
 namespace vesk {
 
-xstring LimitText(std::string_view text, std::size_t most) {
-  if (text.size() <= most) return xstring(text);
-  while (most > 0 && (static_cast<octet_t>(text[most]) & 0xC0) == 0x80) --most;
-  return xstring(text.substr(0, most)) + "...";
-}
+inline namespace parts {
 
-namespace {
-
-xstring TypeNameOf(DGNode const& node) {
+inline xstring TypeNameOf(DGNode const& node) {
   xstring name = typeid(node).name();
 #if defined(__GNUC__)
   int status;
@@ -39,7 +32,7 @@ xstring TypeNameOf(DGNode const& node) {
 }
 
 // The class that a node is declared in; that of the mixin's object for one in a mixin.
-xstring FindClassName(xstring const& type) {
+inline xstring FindClassName(xstring const& type) {
   const std::size_t end = type.rfind("::");
   if (end == xstring::npos) return xstring();
   const xstring name = type.substr(0, end);
@@ -70,12 +63,14 @@ class NodeTypes {
 };
 
 // "twice" of "Cell::twice".
-xstring MemberName(xstring const& name) {
+inline xstring MemberName(xstring const& name) {
   const std::size_t at = name.find("::");
   return xstring(at == xstring::npos ? std::string(name) : name.substr(at + 2));
 }
 
-octet_t const* AddressOf(DGNode const& node) { return static_cast<octet_t const*>(dynamic_cast<void const*>(&node)); }
+inline octet_t const* AddressOf(DGNode const& node) {
+  return static_cast<octet_t const*>(dynamic_cast<void const*>(&node));
+}
 
 // The object is what a node visits last. A stale value may refer to what is gone: only one that is fresh is visited.
 struct LastObject : IObjectVisitor {
@@ -83,7 +78,7 @@ struct LastObject : IObjectVisitor {
   ptr<IObject> m_object;
 };
 
-void const* AskForOwner(DGNode const& node, ReflectedClass const& record) {
+inline void const* AskForOwner(DGNode const& node, ReflectedClass const& record) {
   if (GraphAccess::StateOf(node) != GS_FRESH || !GraphAccess::HasValue(node)) return nullptr;
   LastObject visitor;
   node.VisitContainingObject(visitor);
@@ -97,7 +92,7 @@ Field const* FieldNamed(Field const* fields, ssize_t count, xstring const& name)
   return at == fields + count ? nullptr : at;
 }
 
-bool IsShort(EValueKind kind) { return kind >= VK_BOOL && kind <= VK_ENUM; }
+inline bool IsShort(EValueKind kind) { return kind >= VK_BOOL && kind <= VK_ENUM; }
 
 class Viewer {
  public:
@@ -257,28 +252,28 @@ class Viewer {
   std::unordered_map<void const*, ReflectedClass const*> m_owners;
 };
 
-xvector<DGNode const*> PartOf(DGLinks const& links, std::size_t first, std::size_t count) {
+inline xvector<DGNode const*> PartOf(DGLinks const& links, std::size_t first, std::size_t count) {
   xvector<DGNode const*> nodes;
   for (std::size_t i = first; i < links.size() && i - first < count; ++i) nodes.push_back(links.begin()[i].m_node);
   return nodes;
 }
 
-}  // namespace
+}  // namespace parts
 
-GraphView ViewGraph(xvector<DGNode const*> const& around, GraphLimits const& limits, GraphWatch* watch) {
+inline GraphView ViewGraph(xvector<DGNode const*> const& around, GraphLimits const& limits, GraphWatch* watch) {
   return Viewer(limits, watch).View(around);
 }
 
-xvector<DGNode const*> InputsOf(DGNode const& node, std::size_t first, std::size_t count) {
+inline xvector<DGNode const*> InputsOf(DGNode const& node, std::size_t first, std::size_t count) {
   return PartOf(GraphAccess::Inputs(node), first, count);
 }
-xvector<DGNode const*> DependentsOf(DGNode const& node, std::size_t first, std::size_t count) {
+inline xvector<DGNode const*> DependentsOf(DGNode const& node, std::size_t first, std::size_t count) {
   return PartOf(GraphAccess::Dependents(node), first, count);
 }
 
 // Functions have no place in the record: they are found among the nodes that have a value. One that has keys is not
 // in the object, but tells it.
-static void AddCaches(ReflectedClass const& record, void const* object, std::size_t most,
+inline void AddCaches(ReflectedClass const& record, void const* object, std::size_t most,
                       xvector<DGNode const*>& nodes) {
   NodeTypes types;
   const std::unordered_set<DGNode const*> known(nodes.begin(), nodes.end());
@@ -294,7 +289,7 @@ static void AddCaches(ReflectedClass const& record, void const* object, std::siz
   });
 }
 
-xvector<DGNode const*> NodesOf(ReflectedClass const& record, void const* object, std::size_t most) {
+inline xvector<DGNode const*> NodesOf(ReflectedClass const& record, void const* object, std::size_t most) {
   xvector<DGNode const*> nodes;
   octet_t* const begin = static_cast<octet_t*>(const_cast<void*>(object));
   for (ssize_t i = 0; i < record.m_numFields && nodes.size() < most; ++i) {
@@ -310,7 +305,7 @@ xvector<DGNode const*> NodesOf(ReflectedClass const& record, void const* object,
   return nodes;
 }
 
-DGNode const* FindNode(ReflectedClass const& record, void const* object, std::string_view name) {
+inline DGNode const* FindNode(ReflectedClass const& record, void const* object, std::string_view name) {
   for (DGNode const* node : NodesOf(record, object)) {
     if (MemberName(node->Name()) == name) return node;
   }

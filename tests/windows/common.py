@@ -1,0 +1,36 @@
+"""What the groups of tests under Wine share."""
+
+import subprocess
+from pathlib import Path
+
+ROOT = Path(__file__).resolve().parents[2]
+WINE = "/usr/lib/wine/wine64"
+WRAPPER = str(ROOT / "tests/windows/Qrex")
+
+
+class Count:
+    def __init__(self, name):
+        self.name, self.passed, self.failed, self.skipped = name, 0, [], []
+
+    def take(self, label, failure):
+        if failure is None:
+            self.passed += 1
+        else:
+            self.failed.append(label)
+            print(f"FAILED {label}\n{failure}", flush=True)
+
+    def skip(self, label, reason):
+        self.skipped.append(label)
+        print(f"skipped {label}: {reason}", flush=True)
+
+    def end(self):
+        print(f"== {self.name}: {self.passed} passed, {len(self.failed)} failed, {len(self.skipped)} skipped", flush=True)
+
+
+def run(command, **options):
+    return subprocess.run(command, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=590,
+                          **options)
+
+
+def text_of(done):
+    return done.stdout.decode(errors="replace").replace("\r", "")
