@@ -17,7 +17,8 @@ if(NOT CMAKE_CROSSCOMPILING)
   install(FILES ${manual}/Qrex.bash DESTINATION ${CMAKE_INSTALL_DATADIR}/bash-completion/completions RENAME Qrex COMPONENT tool)
   install(FILES ${manual}/_Qrex DESTINATION ${CMAKE_INSTALL_DATADIR}/zsh/vendor-completions COMPONENT tool)
 endif()
-install(DIRECTORY runtime DESTINATION ${CMAKE_INSTALL_DATADIR}/qrex COMPONENT runtime)
+install(DIRECTORY runtime DESTINATION ${CMAKE_INSTALL_DATADIR}/qrex COMPONENT runtime
+        PATTERN inspector EXCLUDE)  # what headers are made of
 
 # What other people's builds find: as installed, wherever that is moved, and in the build folder. There the runtime is
 # made of its sources, as the tool itself takes it there.

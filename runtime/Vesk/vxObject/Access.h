@@ -49,6 +49,9 @@ class Value {
   Value(ReflectedClass const& record, void* object);
   Value(ReflectedType const& type, void* address);
   Value(ReflectionByteCode type, void* address) : Value(DecodeType(type), address) {}
+  // Of a type that is resolved already.
+  Value(std::shared_ptr<ValueTypes> types, ValueType const& type, void* address)
+      : m_types(std::move(types)), m_type(&type), m_address(address) {}
 
   explicit operator bool() const { return m_address != nullptr; }
   EValueKind Kind() const;
@@ -66,8 +69,18 @@ class Value {
   // All of them in order, until `each` answers false: one walk, where asking by position walks each time.
   typedef std::function<bool(xstring const& name, Value const& value)> EachFunction;
   void Each(EachFunction const& each) const;
+  // Those of [first, first + count) alone; what stands ahead of them costs a step each at most, and no name.
+  void EachOf(ssize_t first, ssize_t count, EachFunction const& each) const;
   // By a path such as "lines[2].amount" or "prices[apple]". Empty where there is no such thing.
   Value Find(std::string_view path) const;
+
+  // What a reference leads to, the item of a variant, the value in an openvariant; with the item's or type's name.
+  // Empty where there is none. The last two are copies, as where they stand only the variant knows: to change them,
+  // change the variant.
+  Value Target(xstring* name = nullptr) const;
+
+  // A `$dep` field of a class: its value as it stands, calculated or not; empty where it has none.
+  Value Dep(ReflectedDepField const& field) const;
 
   // The value itself. T must be its type.
   template <typename T>
@@ -96,6 +109,7 @@ class Value {
 
   void CheckType(ReflectedType const& type) const;
   Value Child(ValueType const* type, void* address, xstring const& name) const;
+  Value Archived(ValueType const* type, InputArchive& ar) const;
   Value FieldAt(ssize_t position) const;
   xstring EntryName(ssize_t position, void* entry) const;
   bool IsNamed(void* entry, std::string_view name) const;  // of a set or map

@@ -118,6 +118,15 @@ void ResizeList(ValueType const& type, void* container, ssize_t count);
 // The entry of the key that `fill` completes, its value fresh. Null when a set or map has the key already.
 void* InsertEntry(ValueType const& type, void* container, ValueFunction const& fill);
 
+// Whether a pref or cref may stand in such a value.
+bool HasReferences(ValueTypes& types, ValueType const& type);
+
+// --- Copies. Both values are of the type; AccessError for what cannot be copied. After an error `to` is any value.
+
+void CopyValue(ValueType const& type, void* to, void const* from);
+// Two lists of the type: no element is touched.
+void SwapLists(ValueType const& type, void* a, void* b);
+
 // --- Archives of values by structure, as the archive of a variant or an openvariant holds them
 
 void WriteValue(Archive& ar, ValueType const& type, void* address);

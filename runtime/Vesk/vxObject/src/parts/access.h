@@ -1,6 +1,6 @@
 // Values by name, and their text.
 
-@import "Vesk/vxObject/ValueTypes.h"
+@import "Vesk/vxObject/src/json_text.h"
 
 #include <charconv>
 
@@ -13,7 +13,7 @@ struct Value::Owner {
   xstring m_path;                     // from the outermost value to what is changed
   DGIndepNode* m_node = nullptr;      // of an `$indep` field
   std::function<void()> m_writeBack;  // of a value that is no object in memory
-  std::shared_ptr<bool> m_bit;
+  std::shared_ptr<void> m_held;       // the same: where it stands meanwhile
 };
 
 Value::Value(ReflectedClass const& record, void* object)
@@ -86,25 +86,92 @@ Value Value::EntryAt(ssize_t position, void* entry) const {
   xvector<bool>& bits = *static_cast<xvector<bool>*>(m_address);
   const auto bit = std::make_shared<bool>(bits[position]);
   child.m_address = bit.get();
-  child.m_owner->m_bit = bit;
+  child.m_owner->m_held = bit;
   child.m_owner->m_writeBack = [&bits, position, bit = bit.get()] { bits[position] = *bit; };
   return child;
 }
 
-void Value::Each(EachFunction const& each) const {
+void Value::Each(EachFunction const& each) const { EachOf(0, std::numeric_limits<ssize_t>::max(), each); }
+
+void Value::EachOf(ssize_t first, ssize_t count, EachFunction const& each) const {
   const EValueKind kind = Kind();
+  ssize_t position = std::max<ssize_t>(first, 0);
+  const ssize_t end = position + std::min(count, std::numeric_limits<ssize_t>::max() - position);
   if (kind == VK_CLASS) {
     xvector<ValueField> const& fields = m_types->FieldsOf(*m_type);
-    for (ssize_t i = 0; i < static_cast<ssize_t>(fields.size()) && each(fields[i].m_name, FieldAt(i)); ++i) {
+    const ssize_t last = std::min(end, static_cast<ssize_t>(fields.size()));
+    for (; position < last && each(fields[position].m_name, FieldAt(position)); ++position) {
     }
   } else if (kind == VK_LIST || kind == VK_SET || kind == VK_MAP) {
-    ssize_t position = 0;
+    ssize_t skipped = 0;
     EachEntry(*m_type, m_address, [&](void* entry) {
+      if (skipped < first) return ++skipped > 0;
+      if (position >= end) return false;
       const bool goesOn = each(EntryName(position, entry), EntryAt(position, entry));
       ++position;
       return goesOn;
     });
   }
+}
+
+Value Value::Archived(ValueType const* type, InputArchive& ar) const {
+  if (!type || type->m_size == 0) return Value();
+  CheckNoReferences(*m_types, *type);
+  const auto held = std::make_shared<HeldValue>(*type);
+  ReadValue(ar, *type, held->Get());
+  Value value;
+  value.m_types = m_types;
+  value.m_type = type;
+  value.m_address = held->Get();
+  value.m_owner = std::make_shared<Owner>();
+  value.m_owner->m_held = held;
+  return value;
+}
+
+Value Value::Target(xstring* name) const {
+  Value target;
+  const EValueKind kind = Kind();
+  if (kind == VK_REFERENCE) {
+    target.m_types = m_types;
+    target.m_address = *static_cast<void* const*>(m_address);
+    if (!target) return Value();
+    target.m_type =
+        m_type->m_code == RC_CREF
+            ? &m_types->Of(NamedType(RC_CLASS, m_type->m_target.c_str()))
+            : &m_types->Of(
+                  *JsonObjectOf(m_type->m_target, *static_cast<AnyInterface*>(m_address))->GetReflectedClass());
+    if (name) *name = target.TypeName();
+    return target;
+  }
+  if (kind != VK_VARIANT && kind != VK_OPENVARIANT) return Value();
+  Archive archive;
+  if (kind == VK_OPENVARIANT) {
+    static_cast<openvariant<int32> const*>(m_address)->Serialise(archive);
+  } else {
+    WriteValue(archive, *m_type, m_address);
+  }
+  InputArchive ar(archive);
+  if (kind == VK_OPENVARIANT) {
+    xstring type;
+    ar >> type;
+    if (!type.empty()) target = Archived(JsonTypeOfName(*m_types, type), ar);
+    if (name) *name = type;
+  } else {
+    ssize_t tag;
+    DeserialiseVariableLengthUint(ar, tag);
+    if (tag >= m_type->m_variant->m_numItems) throw AccessError("no such item in " + m_type->m_text);
+    target = Archived(m_types->ItemOf(*m_type->m_variant, tag), ar);
+    if (name) *name = xstring(JsonItemName(m_type->m_variant->m_items[tag].m_name));
+  }
+  return target;
+}
+
+Value Value::Dep(ReflectedDepField const& field) const {
+  if (Kind() != VK_CLASS) throw AccessError("no class");
+  if (!field.m_type) return Value();
+  ReflectedClass const& record = *m_type->m_class;
+  return Child(&m_types->Of(DecodeType({field.m_type, record.m_strings})),
+               static_cast<octet_t*>(m_address) + field.m_valueOffset, field.m_name);
 }
 
 Value Value::At(ssize_t position) const {
@@ -175,6 +242,9 @@ void Value::CheckType(ReflectedType const& type) const {
 
 void Value::Change(std::function<void()> const& write) const {
   if (!m_address) throw AccessError("no value");
+  for (Owner const* owner = m_owner.get(); owner; owner = owner->m_outer.get()) {
+    if (owner->m_held && !owner->m_writeBack) throw AccessError("a copy of what a variant holds");
+  }
   for (Owner const* owner = m_owner.get(); owner; owner = owner->m_outer.get()) {
     if (!owner->m_outer && ModelHook::Any()) {
       ModelHook::Notify({ModelChange::Write, owner->m_object, owner->m_record, Path(), m_owner->m_path.c_str()});

@@ -390,4 +390,73 @@ void* InsertEntry(ValueType const& type, void* container, ValueFunction const& f
   return entry ? entry->At(work.m_shift) : nullptr;
 }
 
+// --- Copies
+
+namespace {
+
+void CopyEntries(ValueType const& type, void* to, void* from) {
+  if (IsBits(type)) {
+    BitsOf(to) = BitsOf(from);
+    return;
+  }
+  if (type.m_kind == VK_LIST) {
+    if (type.m_code != RC_ARRAY) ResizeList(type, to, CountOf(type, from));
+    xvector<void*> elements;
+    EachEntry(type, from, [&](void* element) {
+      elements.push_back(element);
+      return true;
+    });
+    std::size_t at = 0;
+    return EachEntry(type, to, [&](void* element) {
+      CopyValue(*type.m_item, element, elements[at++]);
+      return true;
+    });
+  }
+  ClearContainer(type, to);
+  EachEntry(type, from, [&](void* entry) {
+    void* const made =
+        InsertEntry(type, to, [&](void* key) { CopyValue(type.m_key ? *type.m_key : *type.m_item, key, entry); });
+    if (made && type.m_key) CopyValue(*type.m_item, type.ItemOf(made), type.ItemOf(entry));
+    return true;
+  });
+}
+
+}  // namespace
+
+void CopyValue(ValueType const& type, void* to, void const* from) {
+  switch (type.m_kind) {
+    case VK_TEXT:
+    case VK_CLASS:
+    case VK_VARIANT:
+      if (!type.m_ops->m_assign) throw AccessError("cannot be copied: " + type.m_text);
+      return type.m_ops->m_assign(to, 0, from, 0, 1);
+    case VK_LIST:
+    case VK_SET:
+    case VK_MAP:
+      return CopyEntries(type, to, const_cast<void*>(from));
+    case VK_OPENVARIANT:
+      *static_cast<openvariant<int32>*>(to) = *static_cast<openvariant<int32> const*>(from);
+      return;
+    default:
+      std::memcpy(to, from, type.m_size);
+  }
+}
+
+void SwapLists(ValueType const& type, void* a, void* b) {
+  switch (type.m_code) {
+    case RC_VECTOR:
+      return IsBits(type) ? BitsOf(a).swap(BitsOf(b)) : BytesOf(a).swap(BytesOf(b));
+    case RC_DEQUE:
+      return static_cast<std::deque<octet_t>*>(a)->swap(*static_cast<std::deque<octet_t>*>(b));
+    case RC_LIST:
+      return static_cast<ListView*>(a)->swap(*static_cast<ListView*>(b));
+    case RC_DYNARRAY:
+      std::swap(DynArrayView::Items(a), DynArrayView::Items(b));
+      std::swap(DynArrayView::Size(a), DynArrayView::Size(b));
+      return;
+    default:
+      throw AccessError("no list of any length: " + type.m_text);
+  }
+}
+
 }  // namespace vesk

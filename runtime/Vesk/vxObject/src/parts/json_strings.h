@@ -125,9 +125,13 @@ bool HasReferences(ValueTypes& types, ValueType const& type, xset<ValueType cons
 
 }  // namespace
 
-void CheckNoReferences(ValueTypes& types, ValueType const& type) {
+bool HasReferences(ValueTypes& types, ValueType const& type) {
   xset<ValueType const*> seen;
-  if (HasReferences(types, type, seen)) throw JsonError("references in a variant: " + type.m_text);
+  return HasReferences(types, type, seen);
+}
+
+void CheckNoReferences(ValueTypes& types, ValueType const& type) {
+  if (HasReferences(types, type)) throw JsonError("references in a variant: " + type.m_text);
 }
 
 ptr<IObject> JsonObjectOf(xstring interface, AnyInterface any) {

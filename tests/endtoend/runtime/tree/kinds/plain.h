@@ -69,7 +69,7 @@ public:
     $Numbers typedefd;
     $int32 fixed[3];
 
-    $int32 Add(int32 a, int32 b) const { return a + b + i8; }
+    $int32 Add(int32 a, int32 b) const { return static_cast<int32>(int64(a) + b + i8); }
     $void Rename(vesk::string8 const& name) { s8 = name; }
 };
 
@@ -78,7 +78,7 @@ public:
     $indep int8 tiny;
     $indep int32 number;
     $indep string8 text;
-    $dep int32 twice = { twice = number * 2 + int32(tiny); };
+    $dep int32 twice = { twice = static_cast<int32>(int64(number) * 2 + tiny); };
 };
 
 }

@@ -1,0 +1,107 @@
+// The messages of a page of the inspector, one behind each zero byte; one that begins with `#` is of bytes. Each gets
+// one answer, which is JSON in UTF-8, and the values that are shown can still be shown afterwards.
+
+#include "Vesk/vxObject/InspectorSession.h"
+#include "kinds/plain.h"
+#include "seeds.h"
+
+namespace {
+
+void Require(bool holds) {
+  if (!holds) std::abort();
+}
+
+struct Shown {
+  Shown() {
+    reflected.parts.resize(3);
+    sources.tiny = 1;
+    sources.number = 2;
+    Show("reflected", reflected);
+    Show("everything", everything);
+    Show("tree", tree);
+    Show("doc", doc);
+    Show("sources", sources);
+    shared.m_changes.Allow(true);
+    shared.m_log.Listen(true);
+  }
+  template <typename T>
+  void Show(vesk::xstring const& name, T& value) {
+    shared.m_tree.Show(
+        name, [&value] { return vesk::Value::Of(value); }, false);
+  }
+  kinds::Reflected reflected;
+  kinds::Everything everything;
+  kinds::Tree tree;
+  kinds::Doc doc;
+  kinds::Sources sources;
+  vesk::InspectorShared shared;
+};
+
+void Converse(std::string_view input) {
+  Shown shown;
+  int answers = 0;
+  vesk::InspectorSession session(shown.shared, [&](vesk::xstring const& text) {
+    ++answers;
+    Require(vesk::InspectorTree::IsUtf8(text));
+    Require(vesk::InspectorJson::Parse(text).m_kind == vesk::InspectorJson::Object);
+  });
+  for (int i = 0; i < 30 && !input.empty(); ++i) {
+    const std::size_t end = std::min(input.find('\0'), input.size());
+    const std::string_view message = input.substr(0, end);
+    input.remove_prefix(std::min(end + 1, input.size()));
+    answers = 0;
+    const bool isBytes = !message.empty() && message[0] == '#';
+    session.Receive(message.substr(isBytes), !isBytes);
+    Require(answers == 1);
+    session.Tick();
+  }
+  for (vesk::ConstStringZ path :
+       {"[]", "[\"reflected\"]", "[\"everything\"]", "[\"doc\"]", "[\"tree\"]", "[\"sources\"]"}) {
+    session.Receive(vxMakeString("{\"do\":\"rows\",\"path\":" << path << '}'));
+  }
+}
+
+// Everything in each place once.
+std::vector<std::string> Seeds() {
+  std::vector<std::string> seeds;
+  for (vesk::ConstStringZ text : {R"({"id":1,"do":"hello"})",
+                                  R"({"do":"types"})",
+                                  R"({"do":"type","name":"kinds::Doc"})",
+                                  R"({"do":"rows","path":["reflected"],"first":0,"count":50})",
+                                  R"({"do":"look","path":["reflected","parts",0]})",
+                                  R"({"do":"watch","ranges":[{"path":["reflected","deep"],"first":0,"count":9}]})",
+                                  R"({"do":"find","text":"a"})",
+                                  R"({"do":"set","path":["reflected","parts",0,"number"],"value":7})",
+                                  R"({"do":"find","text":"1"})",
+                                  R"({"do":"set","path":["tree"],"value":{"leaf":1}})",
+                                  R"({"do":"insert","path":["reflected","deque"],"at":0})",
+                                  R"({"do":"set","path":["reflected","byName"],"value":{"a":{"number":2}}})",
+                                  R"({"do":"redo"})",
+                                  R"({"do":"rows","path":["reflected","byName",{"k":"a","at":0}]})",
+                                  R"({"do":"compare"})",
+                                  R"({"do":"insert","path":["reflected","list"],"at":0,"value":{"name":"x"}})",
+                                  R"({"do":"parts","slot":0})",
+                                  R"({"do":"remove","path":["reflected","parts"],"at":1})",
+                                  R"({"do":"calculate","path":["sources","twice"]})",
+                                  R"({"do":"move","path":["reflected","parts"],"from":0,"to":2})",
+                                  R"({"do":"graph","path":["sources"],"depth":3})",
+                                  R"({"do":"set","path":["sources","number"],"value":4})",
+                                  R"({"do":"graph","node":1})",
+                                  R"({"do":"call","path":["reflected"],"method":"Add","args":[1,2]})",
+                                  R"({"do":"call","path":["reflected"],"method":"Rename","args":["a"]})"}) {
+    seeds.push_back(std::string(text) + '\0' + R"({"do":"undo"})");
+  }
+  const kinds::Doc doc;
+  const vesk::xvector<vesk::octet_t> bytes = vesk::WriteObject(vesk::ptr<kinds::IDoc>(const_cast<kinds::Doc*>(&doc)));
+  seeds.push_back("#{\"do\":\"archive\",\"slot\":0}\n" + std::string(bytes.begin(), bytes.end()));
+  return seeds;
+}
+
+}  // namespace
+
+extern "C" int LLVMFuzzerInitialize(int* count, char*** arguments) { return Begin(*count, *arguments, Seeds); }
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+  if (size > 0) Converse(std::string_view(reinterpret_cast<char const*>(data) + 1, size - 1));
+  return 0;
+}
