@@ -130,7 +130,7 @@ xstring DumpArchiveOf(xvector<octet_t> bytes, ArchiveOptions const& options = Ar
 }  // namespace vesk
 
 // What stands above is defined here: a program that looks into no archive does not compile it.
-@import "Vesk/vxObject/src/parts/archive_walk.h"
-@import "Vesk/vxObject/src/parts/archive_text.h"
-@import "Vesk/vxObject/src/parts/archive_today.h"
-@import "Vesk/vxObject/src/parts/archive_changes.h"
+@import "Vesk/vxObject/views/archive_walk.h"
+@import "Vesk/vxObject/views/archive_text.h"
+@import "Vesk/vxObject/views/archive_today.h"
+@import "Vesk/vxObject/views/archive_changes.h"

@@ -75,4 +75,4 @@ DGNode const* FindNode(ReflectedClass const& record, void const* object, std::st
 }  // namespace vesk
 
 // What stands above is defined here: a program that looks into no graph does not compile it.
-@import "Vesk/vxObject/src/parts/graph_view.h"
+@import "Vesk/vxObject/views/graph_view.h"

@@ -1,7 +1,7 @@
 // The text of JSON, token by token. Check reads all of it once: what follows meets only well-formed text, and knows how
 // many elements each array has.
 
-@import "Vesk/vxObject/src/json_text.h"
+@import "Vesk/vxObject/JsonText.h"
 
 namespace vesk {
 

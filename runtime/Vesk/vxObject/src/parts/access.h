@@ -1,6 +1,6 @@
 // Values by name, and their text.
 
-@import "Vesk/vxObject/src/json_text.h"
+@import "Vesk/vxObject/JsonText.h"
 
 #include <charconv>
 

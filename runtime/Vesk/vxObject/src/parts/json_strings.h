@@ -1,6 +1,6 @@
 // Strings of JSON, and how variants and objects are named.
 
-@import "Vesk/vxObject/src/json_text.h"
+@import "Vesk/vxObject/JsonText.h"
 
 namespace vesk {
 

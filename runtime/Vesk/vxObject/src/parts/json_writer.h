@@ -2,7 +2,7 @@
 
 @import "Vesk/vxObject/Json.h"
 @import "Vesk/vxObject/ValueTypes.h"
-@import "Vesk/vxObject/src/json_text.h"
+@import "Vesk/vxObject/JsonText.h"
 
 #include <charconv>
 #include <cmath>

@@ -2,7 +2,7 @@
 // "kinds::Cell::Depnode_twice", "kinds::Counted<vesk::IObjectBaseMixin<kinds::Cell, vesk::EmptyBase> >::Depnode_more".
 
 @import "Vesk/vxObject/ValueTypes.h"
-@import "Vesk/vxObject/src/shared.h"
+@import "Vesk/vxObject/views/limit_text.h"
 
 #include <cstdlib>
 #include <cstring>
@@ -15,7 +15,7 @@
 
 namespace vesk {
 
-inline namespace parts {
+inline namespace views {
 
 inline xstring TypeNameOf(DGNode const& node) {
   xstring name = typeid(node).name();
@@ -258,7 +258,7 @@ inline xvector<DGNode const*> PartOf(DGLinks const& links, std::size_t first, st
   return nodes;
 }
 
-}  // namespace parts
+}  // namespace views
 
 inline GraphView ViewGraph(xvector<DGNode const*> const& around, GraphLimits const& limits, GraphWatch* watch) {
   return Viewer(limits, watch).View(around);

@@ -1,7 +1,7 @@
 // Parts of archives as texts, and the text of all.
 
-@import "Vesk/vxObject/src/archive_walker.h"
-@import "Vesk/vxObject/src/json_text.h"
+@import "Vesk/vxObject/views/archive_walker.h"
+@import "Vesk/vxObject/JsonText.h"
 
 namespace vesk {
 
@@ -18,7 +18,7 @@ inline uint32 CompactAt(octet_t const* bytes) {
 
 // --- Values
 
-inline namespace parts {
+inline namespace views {
 
 inline std::size_t SizeOfCompact(octet_t first) {
   std::size_t size = 1;
@@ -63,7 +63,7 @@ inline xstring EnumText(ValueType const& type, octet_t const* bytes) {
   return TextOf([&](xostream& os) { PrintEnum(os, type.m_enum, static_cast<int32>(CompactAt(bytes))); });
 }
 
-}  // namespace parts
+}  // namespace views
 
 inline xstring ArchiveValueText(ArchiveView::Content const& content, ValueType const& type, octet_t const* bytes) {
   if (type.m_kind == VK_ENUM) return EnumText(type, bytes);
@@ -76,7 +76,7 @@ inline xstring ArchiveValueText(ArchiveView::Content const& content, ValueType c
 
 // --- Nodes
 
-inline namespace parts {
+inline namespace views {
 
 // As a key stands in a path: without quotes.
 inline xstring KeyText(ArchiveView::Content const& content, uint32 entry) {
@@ -111,7 +111,7 @@ inline xstring ReleaseText(ArchiveView::Content const& content, ArchiveNode cons
   });
 }
 
-}  // namespace parts
+}  // namespace views
 
 inline xstring ArchivePathText(ArchiveView::Content const& content, uint32 node) {
   xvector<uint32> way;
@@ -177,7 +177,7 @@ inline xstring ArchiveShortText(ArchiveView::Content const& content, uint32 node
 
 // --- Parts
 
-inline namespace parts {
+inline namespace views {
 
 // Its type, where it has one.
 inline xstring WhatOf(ArchiveNode const& node) {
@@ -300,7 +300,7 @@ inline void PrintPart(xostream& os, ArchivePart const& part, octet_t const* byte
   }
 }
 
-}  // namespace parts
+}  // namespace views
 
 // --- The view
 

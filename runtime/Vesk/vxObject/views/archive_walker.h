@@ -3,7 +3,7 @@
 // reads each object as of today, ahead of the walk: should both not end at the same byte, the record does not tell how
 // the object is written, and its bytes are shown as they are.
 
-@import "Vesk/vxObject/src/archive_view.h"
+@import "Vesk/vxObject/views/archive_view.h"
 
 namespace vesk {
 

@@ -1,10 +1,10 @@
 // The difference of two archives.
 
-@import "Vesk/vxObject/src/archive_view.h"
+@import "Vesk/vxObject/views/archive_view.h"
 
 namespace vesk {
 
-inline namespace parts {
+inline namespace views {
 
 // Which elements of two lists are the same: pairs of positions that ascend on both sides.
 typedef xvector<std::pair<std::size_t, std::size_t>> Matches;
@@ -284,7 +284,7 @@ class Comparer {
   xvector<std::pair<uint32, uint32>> m_pairs;  // of objects, to be compared
 };
 
-}  // namespace parts
+}  // namespace views
 
 inline xvector<ArchiveChange> CompareArchives(ArchiveView const& old, ArchiveView const& now) {
   Comparer comparer(old.Inside(), now.Inside());

@@ -1,6 +1,6 @@
 // What the program itself reads of an archive that is taken apart.
 
-@import "Vesk/vxObject/src/archive_walker.h"
+@import "Vesk/vxObject/views/archive_walker.h"
 
 namespace vesk {
 
@@ -76,7 +76,7 @@ inline bool ArchiveWalker::BeginsWithRelease(ReflectedClass const& record) {
 
 // --- Reading
 
-inline namespace parts {
+inline namespace views {
 
 // What an object that is not there leaves in its place.
 inline NumberedObject NoObject() {
@@ -112,7 +112,7 @@ class FirstObjects {
   xvector<NumberedObject> m_others;
 };
 
-}  // namespace parts
+}  // namespace views
 
 // What was made is destroyed ahead of the objects that it refers to.
 template <typename Read>

@@ -1,11 +1,11 @@
 // An archive beside what is read of it today: fields that were dropped since it was written, and fields that were
 // added.
 
-@import "Vesk/vxObject/src/archive_view.h"
+@import "Vesk/vxObject/views/archive_view.h"
 
 namespace vesk {
 
-inline namespace parts {
+inline namespace views {
 
 inline Value ObjectToday(ArchiveView::Content const& content, std::size_t object) {
   auto const& list = content.m_archive.m_objects.m_list;
@@ -127,7 +127,7 @@ class Evolution {
   xvector<ArchiveChange> m_changes;
 };
 
-}  // namespace parts
+}  // namespace views
 
 inline Value ArchiveView::Today() const {
   Content const& content = *m_content;

@@ -1,7 +1,7 @@
 // The walk through the bytes of an archive.
 
-@import "Vesk/vxObject/src/parts/archive_probe.h"
-@import "Vesk/vxObject/src/json_text.h"
+@import "Vesk/vxObject/views/archive_probe.h"
+@import "Vesk/vxObject/JsonText.h"
 
 namespace vesk {
 
@@ -90,7 +90,7 @@ inline void ArchiveWalker::Walk(ValueType const& type, Step step) {
   }
 }
 
-inline namespace parts {
+inline namespace views {
 
 inline bool IsScalar(ValueType const& type) { return type.m_kind >= VK_BOOL && type.m_kind <= VK_CHAR; }
 
@@ -108,7 +108,7 @@ inline std::size_t LeastBytesOfEntry(ValueType const& container) {
   return LeastBytesOf(*container.m_item) + (container.m_key ? LeastBytesOf(*container.m_key) : 0);
 }
 
-}  // namespace parts
+}  // namespace views
 
 inline void ArchiveWalker::WalkScalar(ValueType const& type, Step step) {
   CheckBools(type, m_archive.Take(type.m_size), 1);

@@ -1,7 +1,7 @@
 // What an ArchiveView consists of: the parts as nodes of a tree, in the order of the bytes, and what was read.
 
 @import "Vesk/vxObject/ValueTypes.h"
-@import "Vesk/vxObject/src/shared.h"
+@import "Vesk/vxObject/views/limit_text.h"
 
 namespace vesk {
 
