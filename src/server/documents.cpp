@@ -33,8 +33,6 @@ std::string FindConfiguration(std::string path) {
   return {};
 }
 
-std::string FolderOf(const std::string& path) { return path.substr(0, path.rfind('/')); }
-
 // The path by which the tool reads it: from the folder that it works in, or absolute.
 std::string ToolPath(const std::string& path, const std::string& folder) {
   return path.starts_with(folder + "/") ? path.substr(folder.size() + 1) : path;

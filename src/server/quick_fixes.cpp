@@ -61,11 +61,6 @@ bool HasWord(std::string_view text, std::string_view word) {
   return false;
 }
 
-std::string_view FolderOf(std::string_view path) {
-  const size_t slash = path.rfind('/');
-  return slash == std::string_view::npos ? std::string_view() : path.substr(0, slash);
-}
-
 std::string UriOf(const std::string& path) {
   std::string full;
   FullPathOf(path, full);
@@ -131,8 +126,8 @@ size_t StatementPlace(std::string_view text) {
   return at == std::string_view::npos ? 0 : BehindLine(text, at);
 }
 
-// In the braces of a folder of files, or as much of its way as is there: `rest` is what is to be written for the
-// others.
+// In the braces of a folder of files, or of as much of its way as is there: `folders` keeps those that are to be
+// written.
 size_t ListingPlace(std::string_view text, std::vector<std::string>& folders) {
   const std::vector<Token> tokens = TokensOf(text);
   const auto opens = [&](size_t i) { return i < tokens.size() && tokens[i].kind == kOpenBrace; };

@@ -46,6 +46,11 @@ std::string_view FileNameOf(std::string_view path) {
   return slash == std::string_view::npos ? path : path.substr(slash + 1);
 }
 
+std::string FolderOf(std::string_view path) {
+  const size_t slash = path.rfind('/');
+  return std::string(path.substr(0, slash == std::string_view::npos ? 0 : slash));
+}
+
 bool StemOf(std::string_view path, std::string& stem) {
   const std::string_view name = FileNameOf(path);
   const size_t dot = name.rfind('.');

@@ -12,6 +12,7 @@ namespace qrex {
 bool LeadsAbove(std::string_view path);
 bool IsAbsolutePath(std::string_view path);
 std::string_view FileNameOf(std::string_view path);
+std::string FolderOf(std::string_view path);            // empty: it stands in none
 bool StemOf(std::string_view path, std::string& stem);  // false, `stem` untouched: no '.', or an empty stem
 std::string NormalisePath(std::string_view path);       // '\' to '/', one trailing '/' removed
 std::string CollapseDots(std::string_view path);        // each "." is removed, each ".." with the folder ahead of it

@@ -58,17 +58,19 @@ class InspectorRows {
     return place.m_value.Kind() == VK_LIST && place.m_value.Type().m_code != RC_ARRAY;
   }
 
+  static void PutEnumLabels(InspectorWriter& out, ReflectedEnum const& record) {
+    out.Name("labels").Open('[');
+    for (ssize_t i = 0; i < record.m_numLabels; ++i) {
+      out.Open('{').Member("label", record.m_labels[i]);
+      out.Member("number", record.m_values ? record.m_values[i] : static_cast<int32>(i));
+      if (record.m_enabled && !record.m_enabled[i]) out.Member("off", true);
+      out.Close('}');
+    }
+    out.Close(']');
+  }
   static void PutLabels(InspectorWriter& out, Value const& value) {
     if (value.Kind() == VK_ENUM && value.Type().m_enum) {
-      ReflectedEnum const& record = *value.Type().m_enum;
-      out.Name("labels").Open('[');
-      for (ssize_t i = 0; i < record.m_numLabels; ++i) {
-        out.Open('{').Member("label", record.m_labels[i]);
-        out.Member("number", record.m_values ? record.m_values[i] : static_cast<int32>(i));
-        if (record.m_enabled && !record.m_enabled[i]) out.Member("off", true);
-        out.Close('}');
-      }
-      out.Close(']');
+      PutEnumLabels(out, *value.Type().m_enum);
     } else if (value.Kind() == VK_VARIANT) {
       ReflectedVariant const& record = *value.Type().m_variant;
       out.Name("items").Open('[');

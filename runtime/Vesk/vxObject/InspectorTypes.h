@@ -137,14 +137,7 @@ class InspectorTypes {
   }
   static void PutEnum(InspectorWriter& out, ReflectedEnum const& record) {
     PutHead(out, "enumeration", TargetOf(record), record.m_metadata, record.m_strings);
-    out.Name("labels").Open('[');
-    for (ssize_t i = 0; i < record.m_numLabels; ++i) {
-      out.Open('{').Member("label", record.m_labels[i]);
-      out.Member("number", record.m_values ? record.m_values[i] : static_cast<int32>(i));
-      if (record.m_enabled && !record.m_enabled[i]) out.Member("off", true);
-      out.Close('}');
-    }
-    out.Close(']');
+    InspectorRows::PutEnumLabels(out, record);
   }
   static void PutVariant(InspectorWriter& out, ReflectedVariant const& record) {
     PutHead(out, "variant", TargetOf(record), record.m_metadata, record.m_strings);
