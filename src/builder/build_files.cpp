@@ -14,8 +14,8 @@ BuildFiles::BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig
 BuildFiles::~BuildFiles() = default;
 
 ScannedFile& BuildFiles::GetScannedFile(ProjectFile& file) {
-  std::unique_ptr<ScannedFile>& slot = scannedByPath[file.path];
-  if (!slot) slot = std::make_unique<ScannedFile>(*this, file);
+  auto& slot = scannedByPath[file.path];
+  if (!slot) slot.reset(new (m_memory.allocate(sizeof(ScannedFile), alignof(ScannedFile))) ScannedFile(*this, file));
   return *slot;
 }
 

@@ -5,6 +5,7 @@
 #include <cstdint>
 #include <map>
 #include <memory>
+#include <memory_resource>
 #include <string>
 #include <unordered_map>
 #include <vector>
@@ -27,6 +28,10 @@ struct DefinedTarget {
 };
 
 class BuildFiles : public TranslationHost {
+  struct Destroy {  // in the memory of all, which goes as one
+    void operator()(ScannedFile* file) const { std::destroy_at(file); }
+  };
+
  public:
   BuildFiles(ConfigSettings& settings, Project& project, ProjectConfig& config);
   ~BuildFiles() override;
@@ -34,7 +39,7 @@ class BuildFiles : public TranslationHost {
   // --- TranslationHost
   const ConfigSettings& Settings() const override { return settings; }
   const ProjectConfig& Config() const override { return config; }
-  ProjectFile* FindFile(const std::string& path) const override { return project.workspace->FindFile(path); }
+  ProjectFile* FindFile(std::string_view path) const override { return project.workspace->FindFile(path); }
   ScannedFile& GetScannedFile(ProjectFile& file) override;
   std::string TranslatedPath(const ScannedFile& file) const override { return paths.Translated(file.file); }
   bool RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) override;
@@ -67,9 +72,10 @@ class BuildFiles : public TranslationHost {
 
  private:
   SymbolIndex m_symbols;  // ahead of the files, whose name spaces refer to it
+  std::pmr::monotonic_buffer_resource m_memory;
 
  public:
-  std::unordered_map<std::string_view, std::unique_ptr<ScannedFile>> scannedByPath;
+  std::pmr::unordered_map<std::string_view, std::unique_ptr<ScannedFile, Destroy>> scannedByPath{&m_memory};
   FileTimes times;
   bool dependencyFileLoaded = false;
   int64_t warningCount = 0, errorCount = 0;

@@ -34,7 +34,7 @@ void ReadRegistry(PayloadReader& reader, DeclarationRegistry& registry) {
 ScannedFile* FindScanned(BuildFiles& builder, std::string_view path) {
   const auto known = builder.scannedByPath.find(path);
   if (known != builder.scannedByPath.end()) return known->second.get();
-  ProjectFile* file = builder.FindFile(std::string(path));
+  ProjectFile* file = builder.FindFile(path);
   if (file) return &builder.GetScannedFile(*file);
   TraceWriter() << "*** Cannot find file " << path << "\n";
   return nullptr;

@@ -100,6 +100,7 @@ void ProjectBuilder::AddLastStep(std::function<void(bool)> whenOver) {
 
 void ProjectBuilder::PrepareFiles(const std::string& dependencyFile) {
   project.CollectFiles();
+  scannedByPath.reserve(project.files.size());
   if (settings.rebuildAll) {
     DeleteReporting(dependencyFile);
   } else if (!LoadDependencyFile(*this, dependencyFile) && settings.diagnostics) {
@@ -153,19 +154,19 @@ void ProjectBuilder::ReadTimes() {
 }
 
 bool ProjectBuilder::TakeTimesAhead() {
-  const std::vector<TimesAhead::Stamps>* const known = timesAhead ? timesAhead->Of(project) : nullptr;
+  std::vector<TimesAhead::Stamps>* const known = timesAhead ? timesAhead->Of(project) : nullptr;
   if (!known) return false;
   m_objectsOf.resize(FileCount());
   m_objects.reserve(scanned.size());
   for (size_t i = 0; i < scanned.size(); ++i) {
-    const TimesAhead::Stamps& stamps = (*known)[i];
+    TimesAhead::Stamps& stamps = (*known)[i];
     ScannedFile& file = *scanned[i];
     file.times.source = stamps.source.time;
     file.times.sourceSize = stamps.source.size;
     file.times.target = stamps.translation.time;
     file.times.targetSize = stamps.translation.size;
-    if (!RunsTools() || !HasObject(file.file)) continue;
-    m_objectsOf[file.index] = &*m_objects.try_emplace(paths.Object(file.file), Object{stamps.object}).first;
+    if (!RunsTools() || stamps.objectPath.empty()) continue;
+    m_objectsOf[file.index] = &*m_objects.try_emplace(std::move(stamps.objectPath), Object{stamps.object}).first;
   }
   return true;
 }

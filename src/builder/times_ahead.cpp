@@ -44,25 +44,27 @@ void TimesAhead::Begin() {
 }
 
 void TimesAhead::ReadOn(size_t last) {
+  Folders folders;
   while (!m_isOver) {
     size_t next = m_next;
     while (next < last && !m_next.compare_exchange_weak(next, next + 1)) {
     }
     if (next >= last) return;
-    Read(m_chunks[next]);
+    Read(m_chunks[next], folders);
   }
 }
 
-void TimesAhead::Read(Chunk& chunk) {
+void TimesAhead::Read(Chunk& chunk, Folders& folders) {
   Entry& entry = *chunk.entry;
   try {
-    FileTimes sources, translations, objects;  // each of a folder or few
     for (size_t i = chunk.begin; i < chunk.end; ++i) {
       const ProjectFile& file = *entry.files[i];
       Stamps& stamps = entry.stamps[i];
-      stamps.source = sources.StampOf(entry.project.SourcePath(file));
-      stamps.translation = translations.StampOf(entry.paths.Translated(file));
-      if (entry.withObjects && HasObject(file)) stamps.object = objects.StampOf(entry.paths.Object(file));
+      stamps.source = folders.sources.StampOf(entry.project.SourcePath(file));
+      stamps.translation = folders.translations.StampOf(entry.paths.Translated(file));
+      if (!entry.withObjects || !HasObject(file)) continue;
+      stamps.objectPath = entry.paths.Object(file);
+      stamps.object = folders.objects.StampOf(stamps.objectPath);
     }
   } catch (...) {
     entry.isKnown = false;  // who asks the system anew is told why
@@ -71,7 +73,7 @@ void TimesAhead::Read(Chunk& chunk) {
   chunk.isRead.notify_all();
 }
 
-const std::vector<TimesAhead::Stamps>* TimesAhead::Of(const Project& project) {
+std::vector<TimesAhead::Stamps>* TimesAhead::Of(const Project& project) {
   if (m_isOver) return nullptr;
   if (m_announced.WriteCount() != m_writesBefore) {
     End();

@@ -23,6 +23,7 @@ class TimesAhead {
  public:
   struct Stamps {
     FileStamp source, translation, object;  // all 0 also where there is no such file to be
+    std::string objectPath;                 // empty: it has none
   };
 
   explicit TimesAhead(const LeftoverSweep& announced);
@@ -33,8 +34,8 @@ class TimesAhead {
   // In the order in which they are going to be asked for. The files of a project stay as they are until the end.
   void Add(Project& project, const ProjectConfig& config, bool withObjects);
   void Begin();  // unless they are too few to be worth a thread
-  // Of project.files, in their order; null: not known, or not any more.
-  const std::vector<Stamps>* Of(const Project& project);
+  // Of project.files, in their order, for the caller to keep what it likes; null: not known, or not any more.
+  std::vector<Stamps>* Of(const Project& project);
   void End();  // they will not be asked for
 
  private:
@@ -56,8 +57,12 @@ class TimesAhead {
     std::atomic<bool> isRead{false};
   };
 
+  struct Folders {
+    FileTimes sources, translations, objects;  // each thread goes through few at a time
+  };
+
   void ReadOn(size_t last);  // chunks that nobody has begun, up to that one
-  static void Read(Chunk& chunk);
+  static void Read(Chunk& chunk, Folders& folders);
 
   const LeftoverSweep& m_announced;
   const size_t m_writesBefore;

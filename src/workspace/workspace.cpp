@@ -50,7 +50,7 @@ Project* Workspace::FindProjectByName(std::string_view projectName) const {
 
 Project* Workspace::FindSubproject(std::string_view path) const { return FindProjectByName(StemOrEmpty(path)); }
 
-ProjectFile* Workspace::FindFile(const std::string& path) const {
+ProjectFile* Workspace::FindFile(std::string_view path) const {
   auto found = fileMap.find(path);
   if (found == fileMap.end() && platform::kNamesFoldCase) found = fileMap.find(platform::FoldCase(path));
   return found == fileMap.end() ? nullptr : found->second;

@@ -22,7 +22,7 @@ class Workspace {
   bool CheckFileReferences();
   Project* FindProjectByName(std::string_view name) const;  // or null
   Project* FindSubproject(std::string_view path) const;     // by the path's stem; or null
-  ProjectFile* FindFile(const std::string& path) const;     // by ProjectFile::path, after CheckFileReferences; or null
+  ProjectFile* FindFile(std::string_view path) const;       // by ProjectFile::path, after CheckFileReferences; or null
 
   std::vector<std::unique_ptr<Project>> projects;
   ConfigSettings& settings;

@@ -108,6 +108,7 @@ void Begin(ScannedFile& file, Work work) {
     file.TakeBack();
   }
   file.state = TranslationState::Running;
+  file.rootNameSpace = std::make_unique<NameSpace>(file, nullptr, "");
   file.host.TranslationBegins(file);
   try {
     work(file);

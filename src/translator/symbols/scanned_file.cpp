@@ -46,10 +46,7 @@ bool DeclarationRegistry::IsDirty() {
 }
 
 ScannedFile::ScannedFile(TranslationHost& host, ProjectFile& file)
-    : host(host),
-      file(file),
-      index(host.NextFileIndex()),
-      rootNameSpace(std::make_unique<NameSpace>(*this, nullptr, "")) {
+    : host(host), file(file), index(host.NextFileIndex()) {
   Begin();
 }
 
@@ -63,7 +60,7 @@ void ScannedFile::TakeBack() {
   if (!HasBegun()) return;
   host.TakenBack(*this);
   rootNameSpace->LeaveIndex();
-  rootNameSpace = std::make_unique<NameSpace>(*this, nullptr, "");
+  rootNameSpace.reset();
   frame.Clear();
   text = {};
   registrations = {};

@@ -41,8 +41,8 @@ class TranslationHost {
   virtual ~TranslationHost() = default;
   virtual const ConfigSettings& Settings() const = 0;
   virtual const ProjectConfig& Config() const = 0;
-  virtual ProjectFile* FindFile(const std::string& path) const = 0;  // the workspace's file map; or null
-  virtual ScannedFile& GetScannedFile(ProjectFile& file) = 0;        // created on first need, not translated
+  virtual ProjectFile* FindFile(std::string_view path) const = 0;  // the workspace's file map; or null
+  virtual ScannedFile& GetScannedFile(ProjectFile& file) = 0;      // created on first need, not translated
   virtual std::string TranslatedPath(const ScannedFile& file) const = 0;
   virtual bool RegisterGuid(const guid& id, const std::string& owner, std::string& existingOwner) = 0;
   virtual DeclarationRegistry& RegisterMap() = 0;
@@ -142,7 +142,7 @@ class ScannedFile {
   size_t place = 0;  // among the files of this pass, in the order of their main loops; 0: not met yet
   FileText text;
   LSFileFrame frame{host.Settings().context.rootFrame.World()};
-  std::unique_ptr<NameSpace> rootNameSpace;
+  std::unique_ptr<NameSpace> rootNameSpace;  // null until then
   Registrations registrations;
   IndexSet importClosure;       // the files that this one imports, directly or through others
   IndexSet mounted;             // those whose @import was passed: their declarations are visible
