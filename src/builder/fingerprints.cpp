@@ -128,7 +128,7 @@ void Fingerprints::NoteObject(const ScannedFile& file, const OutputPrint& object
 
 void Fingerprints::Note(const std::string& output, const OutputPrint& made) { Set(m_others[output], made); }
 
-void Fingerprints::SetTexts(std::string keys, std::string command) {
+void Fingerprints::SetTexts(const std::string& keys, const std::string& command) {
   Set(m_keys, keys);
   Set(m_command, command);
 }

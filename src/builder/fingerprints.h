@@ -62,7 +62,7 @@ class Fingerprints {
   void Note(const std::string& output, const OutputPrint& made);
   const std::string& Keys() const { return m_keys; }
   const std::string& Command() const { return m_command; }
-  void SetTexts(std::string keys, std::string command);
+  void SetTexts(const std::string& keys, const std::string& command);
 
  private:
   template <typename Value>

@@ -44,13 +44,14 @@ ProjectPrints::ProjectPrints(BuildFiles& builder, const std::string& dependencyF
   if (!settings.rebuildAll) m_known.Load(builder, m_path);
   m_keysBefore = m_known.Keys();
   m_commandBefore = m_known.Command();
-  std::string keys = KeysOf(builder.project), command;
+  const std::string keys = KeysOf(builder.project);
+  std::string command;
   m_keys = PrintMixer().Add(keys).Value();
   if (!settings.translateOnly && !builder.project.exported) {
     command = CommandOf(builder.project, builder.config);
     m_command = PrintMixer().Add(command).Value();
   }
-  m_known.SetTexts(std::move(keys), std::move(command));
+  m_known.SetTexts(keys, command);
 }
 
 bool ProjectPrints::Differs(const std::string& output, uint64_t print, const FileStamp& stamp) const {
