@@ -2,8 +2,6 @@
 
 @import "Vesk/vxObject/Channel.h"
 
-#include <deque>
-
 namespace vesk {
 
 class MessageFrames {
@@ -25,19 +23,23 @@ class MessageFrames {
 
   bool HasMessage() const { return m_framed > 0 || m_tooLong > 0; }
   // As many bytes wait as one message may take.
-  bool IsFull() const { return m_skip == 0 && m_in.size() >= m_limit + LengthBytes; }
+  bool IsFull() const { return m_skip == 0 && m_in.size() - m_begin >= m_limit + LengthBytes; }
   // False when there is none. MessageTooLong for one of which the head was kept.
   bool Take(xvector<octet_t>& message);
   void Clear();
 
  private:
+  static constexpr std::size_t KeptBytes = 1 << 16;  // of memory, while nothing waits
+
   bool Find();
   std::size_t LengthAt(std::size_t at) const;
 
   const bool m_keepsHeads;
   std::size_t m_limit = kMessageLimit;
-  std::deque<octet_t> m_in;   // whole messages, then perhaps the head of one that is too long, then a part of one
-  std::size_t m_framed = 0;   // of m_in: the whole messages
+  // From m_begin on whole messages, then perhaps the head of one that is too long, then a part of one.
+  xvector<octet_t> m_in;
+  std::size_t m_begin = 0;
+  std::size_t m_framed = 0;   // of these bytes: the whole messages
   std::size_t m_tooLong = 0;  // how long the one behind them is, whose head stands there; 0 for none
   std::size_t m_skip = 0;     // so much of it is to come, and is dropped
 };

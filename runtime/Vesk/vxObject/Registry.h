@@ -45,7 +45,13 @@ NSE RegisterReflectedTypedef(ReflectedTypedef const* record, XTarget* target);
 template <typename R>
 R const* Find(std::string const& name);
 template <typename R>
-xvector<R const*> All();
+xvector<void const*> AllOfKind();
+template <typename R>
+xvector<R const*> All() {
+  xvector<R const*> records;
+  for (void const* record : AllOfKind<R>()) records.push_back(static_cast<R const*>(record));
+  return records;
+}
 // The project that registered the record; null for none.
 template <typename R>
 XTarget* TargetOf(R const& record);

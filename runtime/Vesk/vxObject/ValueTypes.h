@@ -102,13 +102,31 @@ class HeldValue {
 
 // --- Containers. An entry is an element, or the pair of a map.
 
-typedef std::function<void(void*)> ValueFunction;
+// What is called for the time of a call, and not kept. For each lambda that is a std::function the compiler makes a
+// dozen functions.
+template <typename R>
+class EntryFunction {
+ public:
+  template <typename F>
+  EntryFunction(F const& function) : m_function(&function), m_call(Call<F>) {}
+  R operator()(void* entry) const { return m_call(m_function, entry); }
+
+ private:
+  template <typename F>
+  static R Call(void const* function, void* entry) {
+    return static_cast<R>((*static_cast<F const*>(function))(entry));
+  }
+
+  void const* m_function;
+  R (*m_call)(void const*, void*);
+};
+typedef EntryFunction<void> ValueFunction;
 
 ssize_t CountOf(ValueType const& type, void const* container);
 // The entry at a position that the container has; of bits nothing but that there is one.
 void* EntryOf(ValueType const& type, void* container, ssize_t position);
 // Until `each` answers false.
-void EachEntry(ValueType const& type, void* container, std::function<bool(void*)> const& each);
+void EachEntry(ValueType const& type, void* container, EntryFunction<bool> const& each);
 void MakeContainer(ValueType const& type, void* container);
 // Destroys the entries, not the container.
 void ClearContainer(ValueType const& type, void* container);

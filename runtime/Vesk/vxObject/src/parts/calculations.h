@@ -126,7 +126,7 @@ void GraphState::CalculateHere(DGNode const& node) {
     Forget(node);
     node.m_again = EAgain::No;
     const bool isChanged = Recalculate(node);
-    if (node.m_again != EAgain::No) NeedRest().m_again[&node] |= node.m_again == EAgain::Hard;
+    if (node.m_again != EAgain::No) NeedRest().m_again[&node].m_isHard |= node.m_again == EAgain::Hard;
     node.m_state = ENodeState::Clean;
     JoinEndOfQueue(node);
     if ((std::exchange(node.m_isNews, false) || isChanged) && !node.m_dependents.empty()) SpreadNews(node);
@@ -140,7 +140,7 @@ void GraphState::CalculateHere(DGNode const& node) {
       Unwind(node);
       throw DeepRead();
     }
-    NeedRest().m_failed[&node] = std::current_exception();
+    NeedRest().m_failed[&node].m_error = std::current_exception();
     throw;
   }
 }
@@ -173,9 +173,9 @@ void GraphState::EndOfRest() {
   m_rest->m_failed.clear();
   if (m_targets.capacity() > 1024) m_targets.shrink_to_fit();
   while (m_rest && !m_rest->m_again.empty()) {
-    const auto [node, hard] = *m_rest->m_again.begin();
+    const auto [node, again] = *m_rest->m_again.begin();
     m_rest->m_again.erase(m_rest->m_again.begin());
-    Invalidate(*node, hard);
+    Invalidate(*node, again.m_isHard);
   }
   if (!m_isWatched) delete std::exchange(m_rest, nullptr);
 }

@@ -270,7 +270,7 @@ ssize_t CountOf(ValueType const& type, void const* container) {
   }
 }
 
-void EachEntry(ValueType const& type, void* container, std::function<bool(void*)> const& each) {
+void EachEntry(ValueType const& type, void* container, EntryFunction<bool> const& each) {
   if (IsBits(type)) {
     for (bool bit : BitsOf(container)) {
       if (!each(&bit)) return;

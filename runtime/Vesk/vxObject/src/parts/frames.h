@@ -16,6 +16,10 @@ bool MessageFrames::Append(octet_t const* bytes, std::size_t size) {
   const std::size_t skipped = std::min(size, m_skip);
   m_skip -= skipped;
   try {
+    if (m_begin > m_in.size() / 2) {  // what is moved is less than what has been read since
+      m_in.erase(m_in.begin(), m_in.begin() + static_cast<ssize_t>(m_begin));
+      m_begin = 0;
+    }
     m_in.insert(m_in.end(), bytes + skipped, bytes + size);
   } catch (std::bad_alloc const&) {
     return false;
@@ -25,17 +29,18 @@ bool MessageFrames::Append(octet_t const* bytes, std::size_t size) {
 
 // Whole messages in what came. Of one that is too long only the head stays.
 bool MessageFrames::Find() {
-  while (m_tooLong == 0 && m_in.size() - m_framed >= LengthBytes) {
-    const std::size_t length = LengthAt(m_framed);
-    const std::size_t came = m_in.size() - m_framed - LengthBytes;
+  while (m_tooLong == 0 && m_in.size() - m_begin - m_framed >= LengthBytes) {
+    const std::size_t at = m_begin + m_framed;
+    const std::size_t length = LengthAt(at);
+    const std::size_t came = m_in.size() - at - LengthBytes;
     if (length > m_limit) {
       const std::size_t head = std::min(length, MessageTooLong::HeadBytes);
       if (!m_keepsHeads) return false;
       if (came < head) break;
       m_tooLong = length;
       const std::size_t rest = std::min(came, length) - head;
-      const auto at = m_in.begin() + static_cast<ssize_t>(m_framed + LengthBytes + head);
-      m_in.erase(at, at + static_cast<ssize_t>(rest));
+      const auto behind = m_in.begin() + static_cast<ssize_t>(at + LengthBytes + head);
+      m_in.erase(behind, behind + static_cast<ssize_t>(rest));
       m_skip = length - head - rest;
     } else {
       if (came < length) break;
@@ -54,10 +59,15 @@ std::size_t MessageFrames::LengthAt(std::size_t at) const {
 bool MessageFrames::Take(xvector<octet_t>& message) {
   if (!HasMessage()) return false;
   const std::size_t tooLong = m_framed > 0 ? 0 : m_tooLong;
-  const std::size_t length = tooLong > 0 ? std::min(tooLong, MessageTooLong::HeadBytes) : LengthAt(0);
-  const auto begin = m_in.begin() + static_cast<ssize_t>(LengthBytes);
-  message.assign(begin, begin + static_cast<ssize_t>(length));
-  m_in.erase(m_in.begin(), begin + static_cast<ssize_t>(length));
+  const std::size_t length = tooLong > 0 ? std::min(tooLong, MessageTooLong::HeadBytes) : LengthAt(m_begin);
+  octet_t const* const bytes = m_in.data() + m_begin + LengthBytes;
+  message.assign(bytes, bytes + length);
+  m_begin += LengthBytes + length;
+  if (m_begin == m_in.size()) {
+    m_in.clear();
+    if (m_in.capacity() > KeptBytes) m_in = xvector<octet_t>();
+    m_begin = 0;
+  }
   if (tooLong == 0) {
     m_framed -= LengthBytes + length;
     return true;
@@ -69,7 +79,7 @@ bool MessageFrames::Take(xvector<octet_t>& message) {
 
 void MessageFrames::Clear() {
   m_in.clear();
-  m_framed = m_tooLong = 0;
+  m_begin = m_framed = m_tooLong = 0;
 }
 
 }  // namespace vesk

@@ -34,11 +34,16 @@ struct GraphState::Rest {
   void RethrowErrorOf(DGNode const& node) const {
     if (m_failed.empty()) return;
     const auto failed = m_failed.find(&node);
-    if (failed != m_failed.end()) std::rethrow_exception(failed->second);
+    if (failed != m_failed.end()) std::rethrow_exception(failed->second.m_error);
   }
   CalculationStack m_otherStacks[4];
-  std::unordered_map<DGNode const*, std::exception_ptr> m_failed;
-  std::unordered_map<DGNode const*, bool> m_again;  // dirty when the read ends, and whether hard
+  // Of either table, as the compiler takes a while over each kind.
+  struct Left {
+    std::exception_ptr m_error;
+    bool m_isHard = false;
+  };
+  std::unordered_map<DGNode const*, Left> m_failed;
+  std::unordered_map<DGNode const*, Left> m_again;  // dirty when the read ends
   std::shared_ptr<WatchedNodes> m_watched;          // null without a watch
 };
 

@@ -454,11 +454,10 @@ class JsonReader {
     } else if (type.m_kind == VK_SET || (type.m_key && type.m_key->m_kind == VK_REFERENCE)) {
       ClearContainer(type, address);
     } else if (type.m_kind == VK_LIST || type.m_kind == VK_MAP) {
-      auto forget = [&](void* entry) {
+      EachEntry(type, address, [&](void* entry) {
         Forget(*type.m_item, type.ItemOf(entry));
         return true;
-      };
-      EachEntry(type, address, std::ref(forget));
+      });
     }
   }
 

@@ -79,13 +79,16 @@ template <typename R>
 R const* Find(std::string const& name) {
   return static_cast<R const*>(FindRecord(TableOf<R>::Get(), name).m_record);
 }
-template <typename R>
-xvector<R const*> All() {
-  xvector<R const*> records;
-  for (auto const& [name, registered] : TableOf<R>::Get()) {
-    if (!registered.empty()) records.push_back(static_cast<R const*>(registered.front().m_record));
+static xvector<void const*> InUse(RecordTable const& table) {
+  xvector<void const*> records;
+  for (auto const& [name, registered] : table) {
+    if (!registered.empty()) records.push_back(registered.front().m_record);
   }
   return records;
+}
+template <typename R>
+xvector<void const*> AllOfKind() {
+  return InUse(TableOf<R>::Get());
 }
 template <typename R>
 XTarget* TargetOf(R const& record) {
@@ -193,7 +196,7 @@ XTarget::~XTarget() {
 #define VESK_DEFINE(R)                                                               \
   NSE Register##R(R const* record, XTarget* t) { return RegisterRecord(record, t); } \
   template R const* Find(std::string const&);                                        \
-  template xvector<R const*> All();                                                  \
+  template xvector<void const*> AllOfKind<R>();                                      \
   template XTarget* TargetOf(R const&);
 VESK_RECORD_KINDS(VESK_DEFINE)
 
