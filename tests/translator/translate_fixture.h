@@ -166,6 +166,12 @@ class TranslateTest : public WorldTest {
     }
   }
 
+  // What is told of a header in a new world: its error, or else its messages.
+  std::string Told(const std::string& text) {
+    const std::string error = ErrorInNewWorld("t.h", text);
+    return !error.starts_with("no error") ? error : trace.empty() ? "" : Messages().substr(0, Messages().size() - 1);
+  }
+
   std::string Messages() const { return WithShortPaths(trace); }  // all that was printed
 
   // The project's text now lists this file; the files that it listed before stay as they are.

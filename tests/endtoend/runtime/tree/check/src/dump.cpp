@@ -28,20 +28,6 @@ $class+ Album isa kinds::IDoc : model {
 
 namespace {
 
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-template <typename T>
-Bytes Written(T const& value) {
-    vesk::Archive ar;
-    ar << value;
-    return ar.m_bytes;
-}
-
-Bytes Joined(Bytes a, Bytes const& b) {
-    a.insert(a.end(), b.begin(), b.end());
-    return a;
-}
-
 // The parts that are no groups, with their paths and values.
 vesk::xstring Brief(vesk::ArchiveView const& view) {
     return vesk::TextOf([&](vesk::xostream& os) {

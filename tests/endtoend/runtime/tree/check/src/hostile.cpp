@@ -7,24 +7,12 @@ using namespace kinds;
 
 namespace {
 
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-template <typename... T>
-Bytes Written(T const&... values) {
-    vesk::Archive ar;
-    (ar << ... << values);
-    return ar.m_bytes;
-}
-
 template <typename T>
 bool Refuses(Bytes bytes, T& value, vesk::ArchiveLimits const& limits = {}) {
-    try {
+    return ErrorOf<vesk::ArchiveError>([&] {
         vesk::InputArchive input(std::move(bytes), limits);
         input >> value;
-    } catch (vesk::ArchiveError const&) {
-        return true;
-    }
-    return false;
+    }) != "none";
 }
 
 template <typename T>

@@ -14,34 +14,21 @@ vesk::xstring Q(vesk::xstring text) {
     return text;
 }
 
-vesk::xstring JsonOf(vesk::Value const& value) {
-    try {
-        return vesk::ToJson(value);
-    } catch (vesk::AccessError const& error) {
-        return error.what();
-    }
-}
-
 template <typename T>
 vesk::xstring Json(T const& value) {
-    return JsonOf(vesk::Value::Of(value));
+    return Outcome<vesk::AccessError>([&] { return vesk::ToJson(vesk::Value::Of(value)); });
 }
 
 template <typename T>
-vesk::xstring ErrorOf(T& value, std::string_view text, vesk::JsonLimits const& limits = {}) {
-    try {
-        vesk::FromJsonText(value, text, limits);
-    } catch (vesk::AccessError const& error) {
-        return error.what();
-    }
-    return "none";
+vesk::xstring ReadError(T& value, std::string_view text, vesk::JsonLimits const& limits = {}) {
+    return ErrorOf<vesk::AccessError>([&] { vesk::FromJsonText(value, text, limits); });
 }
 
 // What the value is after the text was read, or the error.
 template <typename T>
 vesk::xstring Read(std::string_view text) {
     T value = T();
-    const vesk::xstring error = ErrorOf(value, text);
+    const vesk::xstring error = ReadError(value, text);
     return error == "none" ? Json(value) : error;
 }
 
@@ -84,7 +71,7 @@ ROW(JsonBothWays) {
     r.list = {Part(), Part()};
     r.byName["old"] = Part();
     r.dynamic = {Part()};
-    CHECK(ErrorOf(r, text), "none");
+    CHECK(ReadError(r, text), "none");
     CHECK(Json(r), text);
     CHECK(r.flag && r.i8 == -128 && r.i64 == INT64_MIN && r.i128 == -int128(~uint128(0) >> 1) - 1 && r.u128 == ~uint128(0), true);
     CHECK(r.f32 == 0.1f && r.f64 == -1e300 && r.s8 == "a\"\\\n\x01\xc3\xa9\xf0\x9f\x98\x80", true);
@@ -105,7 +92,7 @@ ROW(JsonBothWays) {
     style.m_indent = 2;
     CHECK(vesk::ToJsonText(part, style),
           "{\n  \"number\": 1,\n  \"name\": \"n\",\n  \"marks\": [\n    1,\n    -2\n  ]\n}");
-    CHECK(ErrorOf(part, Q(" { 'name' : 'm' } ")), "none");
+    CHECK(ReadError(part, Q(" { 'name' : 'm' } ")), "none");
     CHECK(Json(part), Q("{'number':1,'name':'m','marks':[1,-2]}"));
 
     // A model, with containers of all kinds in it.
@@ -115,7 +102,7 @@ ROW(JsonBothWays) {
     all.grid[1][2].height = 6;
     all.any = Size(3);
     Everything read;
-    CHECK(ErrorOf(read, Json(all)), "none");
+    CHECK(ReadError(read, Json(all)), "none");
     CHECK(read == all, true);
 
     // Variants: items by name, and by their archive where the record tells nothing.
@@ -125,7 +112,7 @@ ROW(JsonBothWays) {
           Q("[{'int32':7},{'string8':'t'},{'ratio':2.5},{'list':{'$bytes':'020100000002000000'}},"
           "{'kinds::Size':{'width':3,'height':3,'colour':'Red','level':'Mid'}},{'numbers':[4]}]"));
     vesk::xvector<Value> back;
-    CHECK(ErrorOf(back, Json(values)), "none");
+    CHECK(ReadError(back, Json(values)), "none");
     CHECK(back == values, true);
 }
 
@@ -140,14 +127,14 @@ void CheckDeque(Make make) {
             items.push_front(items.back());
             items.pop_back();
         }
-        for (int round = 0; round < 2; ++round) CHECK(ErrorOf(back, Json(items)), "none");
+        for (int round = 0; round < 2; ++round) CHECK(ReadError(back, Json(items)), "none");
         CHECK(back == items, true);
         back.push_back(make(1));
         back.push_front(make(2));
         CHECK(back.front() == make(2) && back.back() == make(1) && back.size() == items.size() + 2, true);
     }
     vesk::xdeque<T> broken;
-    CHECK(ErrorOf(broken, "[null]") != "none" && broken.size() <= 1, true);
+    CHECK(ReadError(broken, "[null]") != "none" && broken.size() <= 1, true);
 }
 
 ROW(JsonDeques) {
@@ -226,19 +213,19 @@ ROW(JsonErrors) {
     vesk::openvariant<int32> any;
     vesk::JsonLimits noSize;
     noSize.m_allowType = [](vesk::xstring const& type) { return type != "kinds::Size"; };
-    CHECK(ErrorOf(any, Q("{'$type':'kinds::Size','$value':{}}"), noSize),
+    CHECK(ReadError(any, Q("{'$type':'kinds::Size','$value':{}}"), noSize),
           "line 1, column 1: type is not allowed: kinds::Size");
-    CHECK(ErrorOf(any, Q("{'$type':'int32','$value':1}"), noSize), "none");
+    CHECK(ReadError(any, Q("{'$type':'int32','$value':1}"), noSize), "none");
     // Limits.
     CHECK(Read<Tree>(std::string(200000, '[')), "line 1, column 101: nested too deeply");
     vesk::JsonLimits limits;
     limits.m_memory = 1000;
     limits.m_bytes = 3000;
     Ints ints;
-    CHECK(ErrorOf(ints, "[" + std::string(2000, ' ') + "]", limits), "none");
-    CHECK(ErrorOf(ints, std::string(3001, ' '), limits), "text of 3001 bytes");
+    CHECK(ReadError(ints, "[" + std::string(2000, ' ') + "]", limits), "none");
+    CHECK(ReadError(ints, std::string(3001, ' '), limits), "text of 3001 bytes");
     vesk::xvector<Reflected> large;
-    CHECK(ErrorOf(large, "[{},{},{}]", limits), "line 1, column 1: more memory than is allowed");
+    CHECK(ReadError(large, "[{},{},{}]", limits), "line 1, column 1: more memory than is allowed");
     // What is written with the same limits is read, and nothing else.
     typedef vesk::xlist<vesk::xvector<vesk::string8>> Texts;
     const vesk::xmap<vesk::string8, Texts> texts = {{"a", {{"", "b"}, {}}}, {"c", {}}};
@@ -252,7 +239,7 @@ ROW(JsonErrors) {
         auto compareWith = [&](vesk::JsonLimits const& bounds, int indent) {
             auto copy = value;
             const bool isWritten = !Throws([&] { vesk::ToJsonText(value, {indent}, bounds); });
-            const bool isRead = ErrorOf(copy, text, bounds) == "none";
+            const bool isRead = ReadError(copy, text, bounds) == "none";
             if constexpr (std::is_same<decltype(value), vesk::pref<IDoc>>::value) {
                 if (isRead) copy->DestroyObject();
             }
@@ -271,7 +258,7 @@ ROW(JsonErrors) {
     compare(object);
     limits.m_ignoreUnknown = true;
     Part part;
-    CHECK(ErrorOf(part, Q("{'x':[{'number':5},'}'],'number':2}"), limits), "none");
+    CHECK(ReadError(part, Q("{'x':[{'number':5},'}'],'number':2}"), limits), "none");
     CHECK(part.number, 2);
 }
 
@@ -315,7 +302,7 @@ ROW(JsonObjects) {
     r.objects["doc"] = vesk::pref<vesk::IObject>(vesk::ptr<vesk::IObject>(&doc));
     doc.next = nullptr;
     Reflected other;
-    CHECK(ErrorOf(other, Json(r)), "none");
+    CHECK(ReadError(other, Json(r)), "none");
     CHECK(Json(other), Json(r));
     CHECK(*other.shared == part, true);
     delete other.shared.Get();
@@ -327,7 +314,7 @@ ROW(JsonObjects) {
         vesk::JsonLimits limits;
         limits.m_allow = [](vesk::ReflectedClass const& record) { return record.m_name != std::string("kinds::Calc"); };
         const vesk::xstring error =
-            ErrorOf(target, vxMakeString("{\"$objects\":[" << objects << "],\"$value\":{\"shared\":{\"$ref\":1},"
+            ReadError(target, vxMakeString("{\"$objects\":[" << objects << "],\"$value\":{\"shared\":{\"$ref\":1},"
                                                            << "\"objects\":{\"a\":{\"$ref\":2}}}}"), limits);
         CHECK(target.shared.Get() == nullptr && (target.objects.empty() || !target.objects["a"]), true);
         return error;
@@ -397,21 +384,13 @@ ROW(Access) {
     vesk::CallMethod<void(vesk::string8 const&)>(r, "Rename", "renamed");
     CHECK(r.s8, "renamed");
     Reflected const& fixed = r;
-    auto error = [](auto call) {
-        try {
-            call();
-        } catch (vesk::AccessError const& e) {
-            return vesk::xstring(e.what());
-        }
-        return vesk::xstring();
-    };
-    CHECK(error([&] { vesk::CallMethod<void(vesk::string8 const&)>(fixed, "Rename", ""); }),
+    CHECK(ErrorOf<vesk::AccessError>([&] { vesk::CallMethod<void(vesk::string8 const&)>(fixed, "Rename", ""); }),
           "kinds::Reflected::Rename is not const");
-    CHECK(error([&] { vesk::CallMethod<int32(int32)>(r, "Add", 1); }),
+    CHECK(ErrorOf<vesk::AccessError>([&] { vesk::CallMethod<int32(int32)>(r, "Add", 1); }),
           "kinds::Reflected::Add takes 2 arguments, not 1");
-    CHECK(error([&] { vesk::CallMethod<int32(int32, int64)>(r, "Add", 1, 2); }),
+    CHECK(ErrorOf<vesk::AccessError>([&] { vesk::CallMethod<int32(int32, int64)>(r, "Add", 1, 2); }),
           "kinds::Reflected::Add: b is int32, not int64");
-    CHECK(error([&] { vesk::CallMethod<void(int32, int32)>(r, "Add", 1, 2); }),
+    CHECK(ErrorOf<vesk::AccessError>([&] { vesk::CallMethod<void(int32, int32)>(r, "Add", 1, 2); }),
           "kinds::Reflected::Add: the result is int32, not void");
-    CHECK(error([&] { vesk::CallMethod<void()>(r, "Remove"); }), "no method Remove in kinds::Reflected");
+    CHECK(ErrorOf<vesk::AccessError>([&] { vesk::CallMethod<void()>(r, "Remove"); }), "no method Remove in kinds::Reflected");
 }

@@ -1,15 +1,9 @@
 @import "rows/rows.h"
 @import "kinds/models.h"
 @import "kinds/kinds.h"
+@import "kinds/remote.h"
 
 using namespace kinds;
-
-template <typename T>
-vesk::xvector<vesk::octet_t> Written(T const& value) {
-    vesk::Archive ar;
-    ar << value;
-    return ar.m_bytes;
-}
 
 ROW(Archives) {
     for (vesk::uint32 v : {0u, 127u, 128u, 16383u, 16384u, 2097151u, 2097152u, 268435455u, 268435456u, 4294967295u}) {
@@ -28,7 +22,7 @@ ROW(Archives) {
     CHECK(Written(shapes::Green), "[5]");
     CHECK(Written(vesk::xvector<vesk::int8>{1, 2}), "[2,1,2]");
     CHECK(Throws([] {
-        vesk::InputArchive input(vesk::xvector<vesk::octet_t>{5, 97});
+        vesk::InputArchive input(Bytes{5, 97});
         vesk::string8 text;
         input >> text;
     }), true);
@@ -69,7 +63,7 @@ ROW(Schemas) {
     old.title = "T";
     old.pages = 2;
     old.count = 9;
-    vesk::xvector<vesk::octet_t> bytes = Written(old);
+    Bytes bytes = Written(old);
     CHECK(bytes[0], 3);
     bytes[0] = 1;
     Doc doc;
@@ -86,7 +80,7 @@ ROW(Schemas) {
     next.next = &doc;
     doc.next = &next;
     doc.list.push_back(vesk::pref<IDoc>(&doc));
-    vesk::xvector<vesk::octet_t> whole = vesk::WriteObject(vesk::ptr<IDoc>(&next));
+    Bytes whole = vesk::WriteObject(vesk::ptr<IDoc>(&next));
     const vesk::ptr<IDoc> copy = vesk::ReadObject<IDoc>(whole);
     Doc& read = *static_cast<Doc*>(copy.Object());
     Doc& second = *static_cast<Doc*>(read.next.Get().Object());
@@ -98,7 +92,7 @@ ROW(Schemas) {
     read.DestroyObject();
 
     // Behind a mark and the version of the form; what was written without them is read as well.
-    CHECK(vesk::xvector<vesk::octet_t>(whole.begin(), whole.begin() + 4), "[255,118,120,2]");
+    CHECK(Bytes(whole.begin(), whole.begin() + 4), "[255,118,120,2]");
     Doc alone;
     const vesk::ptr<IDoc> unmarked = vesk::ReadObject<IDoc>(Written(vesk::pref<IDoc>(&alone)));
     CHECK(bool(unmarked), true);
@@ -176,4 +170,83 @@ ROW(Changes) {
     both.x = 1;
     both.q = 2;
     CHECK(vxMakeString(both.x << both.q), "12");
+}
+
+namespace {
+
+// A Doc of the first release: its number, title, pages, count.
+const Bytes g_oldDoc = {1, 1, 'T', 2, 0, 0, 0, 9, 0, 0, 0};
+
+// A Size of the first release (width, height), and a current one.
+const Bytes g_oldSize = {20, 0, 0, 0, 7, 0, 0, 0};
+const Bytes g_newSize = {20, 0, 0, 0, 7, 0, 0, 0, 0, 1};
+
+template <typename Read>
+vesk::xstring SizeText(vesk::InputArchive& input, Read read) {
+    Size size;
+    read(input, size);
+    return vxMakeString(size << ' ' << input.Remaining());
+}
+
+// Between two sizes it reads a current Doc from elsewhere.
+struct ReadsAnother {
+    void Deserialise(vesk::InputArchive& ar) {
+        ar >> first;
+        vesk::Archive written;
+        written << Doc();
+        vesk::InputArchive another(written);
+        Doc doc;
+        another >> doc;
+        ar >> second;
+    }
+    Size first, second;
+};
+
+// Its model is of one release and has scalars only.
+void ReadOldScalars() {
+    vesk::InputArchive input(Bytes{1, 5, 0, 0, 0, 6, 0, 0, 0});
+    Multi multi;
+    multi.Deserialise(input);
+}
+
+}
+
+ROW(Releases) {
+    auto extract = [](vesk::InputArchive& ar, Size& size) { ar >> size; };
+    auto call = [](vesk::InputArchive& ar, Size& size) { size.Deserialise(ar); };
+    vesk::InputArchive waiting(g_newSize);
+    Doc doc;
+
+    vesk::InputArchive old(Joined(g_oldDoc, g_oldSize));
+    old >> doc;
+    CHECK(doc.lines.read(), "[0,0]");
+    vesk::InputArchive current(g_newSize);
+    CHECK(SizeText(current, extract), "Size(20,7,Red,Mid) 0");
+    CHECK(SizeText(old, extract), "Size(20,7,Green,High) 0");
+
+    vesk::InputArchive called(Joined(g_oldDoc, g_oldSize));
+    doc.Deserialise(called);
+    CHECK(doc.lines.read(), "[0,0]");
+    current = vesk::InputArchive(g_newSize);
+    CHECK(SizeText(current, call), "Size(20,7,Red,Mid) 0");
+    CHECK(SizeText(called, extract), "Size(20,7,Green,High) 0");
+    ReadOldScalars();
+    CHECK(SizeText(waiting, call), "Size(20,7,Red,Mid) 0");
+
+    vesk::InputArchive outer(Joined(g_oldDoc, Joined(g_oldSize, g_oldSize)));
+    ReadsAnother both;
+    outer >> doc >> both;
+    CHECK(vxMakeString(both.first << both.second << outer.Remaining()), "Size(20,7,Green,High)Size(20,7,Green,High)0");
+
+    Calc calc;
+    vesk::LocalChannel channel;
+    vesk::Server server(channel.Server());
+    vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
+    const auto stub = vesk::Import<ICalc>(client, server.Export(vesk::ptr<ICalc>(&calc)));
+    vesk::InputArchive again(g_oldDoc);
+    doc.Deserialise(again);
+    Size size(100);
+    vesk::ptr<ICalc>(stub->Interface())->Take(&size);
+    server.Serve();
+    CHECK(calc.notified, 100);
 }

@@ -14,18 +14,6 @@ using namespace kinds;
 
 namespace {
 
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-template <typename Action>
-vesk::xstring ErrorOf(Action action) {
-    try {
-        action();
-    } catch (std::exception const& error) {
-        return error.what();
-    }
-    return "none";
-}
-
 // Longer than what a string holds within itself.
 vesk::string8 Word(int n) { return vxMakeString("a word with the number " << n); }
 
