@@ -16,9 +16,9 @@ namespace {
 
 const std::string kFolder = QREX_SOURCE_DIR "/tests/translator/cases/";
 
-std::vector<std::string> CaseNames(const std::string& extension) {
+std::vector<std::string> NamesIn(const std::string& folder, const std::string& extension) {
   std::vector<std::string> names;
-  for (const auto& entry : std::filesystem::directory_iterator(kFolder)) {
+  for (const auto& entry : std::filesystem::directory_iterator(folder)) {
     const std::string name = entry.path().filename().string();
     if (!name.ends_with(extension) || name.ends_with(".expected.h")) continue;
     names.push_back(name.substr(0, name.size() - extension.size()));
@@ -82,16 +82,16 @@ TEST_P(CasesTest, GivesWhatIsExpected) try {
   FAIL() << ExceptionText(exception);
 }
 
-INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames(".h")),
+INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(NamesIn(kFolder, ".h")),
                          [](const auto& each) { return each.param; });
 
-// `NAME.txt` has headers with what is told of each: an error, or else messages. What only the key makes a fault is none
+// Headers with what is told of each: an error, or else messages. What `compilable_` is told of with the key is no fault
 // without it.
 class ToldTest : public TranslateTest, public ::testing::WithParamInterface<std::string> {};
 
 TEST_P(ToldTest, IsWhatIsExpected) {
   const bool isCompilable = GetParam().starts_with("compilable_");
-  for (const auto& [name, text, expected] : TextCasesOf("translator/cases/" + GetParam() + ".txt")) {
+  for (const auto& [name, text, expected] : TextCasesOf("translator/told/" + GetParam() + ".txt")) {
     SCOPED_TRACE(name + "\n" + text);
     settings.compilableText = isCompilable;
     EXPECT_EQ(expected, Told(text));
@@ -102,7 +102,7 @@ TEST_P(ToldTest, IsWhatIsExpected) {
   }
 }
 
-INSTANTIATE_TEST_SUITE_P(, ToldTest, ::testing::ValuesIn(CaseNames(".txt")),
+INSTANTIATE_TEST_SUITE_P(, ToldTest, ::testing::ValuesIn(NamesIn(QREX_SOURCE_DIR "/tests/translator/told", ".txt")),
                          [](const auto& each) { return each.param; });
 
 }  // namespace

@@ -12,26 +12,19 @@ using namespace kinds;
 ROW(Graph) {
     Cell c;
     c.source = 42;
-    CHECK(c.twice.read(), 84);
-    CHECK(c.tens(), 4);
-    CHECK(vxMakeString(c.sections.read() << ' ' << c.calculated), "104 2");
+    CHECK(vxMakeString(c.twice.read() << ' ' << c.tens() << ' ' << c.sections.read() << ' ' << c.calculated), "84 4 104 2");
     // The source changes and what is read of it does not: only the node between is calculated again.
     c.source = 43;
-    CHECK(c.invalidated, 1);
-    CHECK(c.calculated, 2);
-    CHECK(vxMakeString(c.sections.read() << ' ' << c.calculated), "104 3");
+    CHECK(vxMakeString(c.invalidated << c.calculated << ' ' << c.sections.read() << ' ' << c.calculated), "12 104 3");
     c.source = 51;
-    CHECK(vxMakeString(c.sections.read() << ' ' << c.calculated), "105 5");
-    CHECK(c.hard.read(), 5);
+    CHECK(vxMakeString(c.sections.read() << ' ' << c.calculated << ' ' << c.hard.read()), "105 5 5");
     c.effect();
     c.effect();
     CHECK(c.effects, 1);
     c.source = 52;
     c.effect();
-    CHECK(c.effects, 2);
-    CHECK(c.list.read().size(), 52);
-    CHECK(c.pointer.read() == nullptr, true);
-    CHECK(Throws([&] { c.cyclic.read(); }), true);
+    CHECK(vxMakeString(c.effects << ' ' << c.list.read().size()), "2 52");
+    CHECK(c.pointer.read() == nullptr && Throws([&] { c.cyclic.read(); }), true);
     CHECK(c.label.read(), "start");
     c.Setlabel("set");
     CHECK(c.Getlabel(), "set");
@@ -61,17 +54,12 @@ ROW(Caches) {
     c.source = 30;
     c.sections.read();
     c.EvictDgsNodes();
-    CHECK(c.evicted, 2);
-    CHECK(c.sections.IsUpToDate(), false);
-    CHECK(c.sections.read(), 103);
-    CHECK(c.label.Dependents().size(), 0);
+    CHECK(vxMakeString(c.evicted << c.sections.IsUpToDate() << c.sections.read() << c.label.Dependents().size()), "2false1030");
 
     vesk::EvictionQueue& queue = vesk::EvictionQueue::Get(2);
-    CHECK(c.filled(), "[30,30,30]");
-    CHECK(vxMakeString(queue.Count() << ' ' << queue.ByteSize()), "1 12");
+    CHECK(vxMakeString(c.filled() << queue.Count() << ' ' << queue.ByteSize()), "[30,30,30]1 12");
     queue.EvictDownTo(0);
-    CHECK(queue.Count(), 0);
-    CHECK(c.filled(), "[30,30,30]");
+    CHECK(vxMakeString(queue.Count() << c.filled()), "0[30,30,30]");
 
     Nodes nodes;
     nodes.a = 1;
@@ -94,8 +82,7 @@ ROW(Visiting) {
     a.seen = &b;
     Collector collector;
     collector << a;
-    CHECK(collector.objects.size(), 1);
-    CHECK(collector.objects[0].Object() == &b, true);
+    CHECK(collector.objects.size() == 1 && collector.objects[0].Object() == &b, true);
     a.sections.VisitContainingObject(collector);
     CHECK(collector.objects.size(), 2);
     a.twice.VisitContainingObject(collector);

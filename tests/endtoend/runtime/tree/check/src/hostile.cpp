@@ -65,11 +65,8 @@ ROW(HostileReferences) {
         first->DestroyObject();
         return throws;
     };
-    CHECK(second(vesk::pref<IDoc>()), false);
-    CHECK(second(vesk::cref<Doc>()), false);
-    CHECK(second(vesk::cref<Size>()), true);
-    CHECK(second(vesk::cref<Sized>()), true);
-    CHECK(second(vesk::pref<shapes::INamed>()), true);
+    CHECK(second(vesk::pref<IDoc>()) || second(vesk::cref<Doc>()), false);
+    CHECK(second(vesk::cref<Size>()) && second(vesk::cref<Sized>()) && second(vesk::pref<shapes::INamed>()), true);
 
     // The other way round: a value behind a cref is no object.
     Size size(3);
@@ -170,13 +167,9 @@ ROW(HostileVariants) {
 }
 
 ROW(HostileNumbers) {
-    CHECK(Refuses<bool>({2}), true);
-    CHECK(Refuses<bool>({1}), false);
-    CHECK(Refuses<vesk::xvector<bool>>({2, 1, 255}), true);
-    CHECK(Refuses<vesk::DynArray<bool>>({2, 1, 255}), true);
-    CHECK(Refuses<shapes::Colour>({3}), true);
-    CHECK(Refuses<shapes::Level>({3}), true);
-    CHECK(Refuses<shapes::Refined>({2}), true);
+    CHECK(Refuses<bool>({2}) && !Refuses<bool>({1}), true);
+    CHECK(Refuses<vesk::xvector<bool>>({2, 1, 255}) && Refuses<vesk::DynArray<bool>>({2, 1, 255}), true);
+    CHECK(Refuses<shapes::Colour>({3}) && Refuses<shapes::Level>({3}) && Refuses<shapes::Refined>({2}), true);
     for (int number : {0, 5, 6}) CHECK(Refuses<shapes::Colour>({vesk::octet_t(number)}), false);
     for (int number : {0, 1, 7, 8}) CHECK(Refuses<shapes::Refined>({vesk::octet_t(number)}), false);
     CHECK(Refuses<shapes::Empty>({0}), false);
@@ -189,14 +182,10 @@ ROW(HostileNumbers) {
 }
 
 ROW(HostileSizes) {
-    CHECK(Refuses<vesk::string8>(g_billions), true);
-    CHECK(Refuses<vesk::string16>({2, 0, 0, 0}), true);
-    CHECK(Refuses<vesk::xvector<None>>(g_billions), true);
-    CHECK(Refuses<vesk::xlist<None>>(g_billions), true);
-    CHECK(Refuses<vesk::DynArray<Everything>>(g_billions), true);
-    CHECK(Refuses<vesk::DynArray<int32>>({2, 0, 0, 0, 0, 0, 0, 0}), true);
-    CHECK((Refuses<vesk::xmap<int32, int32>>(g_billions)), true);
-    CHECK(Refuses<vesk::xset<vesk::string8>>(g_billions), true);
+    CHECK(Refuses<vesk::string8>(g_billions) && Refuses<vesk::string16>({2, 0, 0, 0}), true);
+    CHECK(Refuses<vesk::xvector<None>>(g_billions) && Refuses<vesk::xlist<None>>(g_billions), true);
+    CHECK(Refuses<vesk::DynArray<Everything>>(g_billions) && Refuses<vesk::DynArray<int32>>({2, 0, 0, 0, 0, 0, 0, 0}), true);
+    CHECK((Refuses<vesk::xmap<int32, int32>>(g_billions) && Refuses<vesk::xset<vesk::string8>>(g_billions)), true);
     CHECK((Refuses<vesk::Array<int32, 3>>({2, 0, 0, 0, 0, 0, 0, 0, 0})), true);
 
     Everything all;
@@ -221,15 +210,12 @@ ROW(Limits) {
     limits.m_objects = 1;
     limits.m_emptyElements = 2;
     vesk::xvector<None> empty;
-    CHECK(Refuses({2}, empty, limits) || Refuses({3, 0}, empty), false);
-    CHECK(Refuses({3}, empty, limits), true);
+    CHECK(Refuses({3}, empty, limits) && !Refuses({2}, empty, limits) && !Refuses({3, 0}, empty), true);
     Tree tree;
-    CHECK(Refuses({1, 1, 1, 1, 0}, tree, limits), false);
-    CHECK(Refuses({1, 1, 1, 1, 1, 1, 0}, tree, limits), true);
-    CHECK(Refuses({1, 1, 1, 1, 1, 1, 0}, tree), false);
+    const Bytes deep = {1, 1, 1, 1, 1, 1, 0};
+    CHECK(Refuses(deep, tree, limits) && !Refuses({1, 1, 1, 1, 0}, tree, limits) && !Refuses(deep, tree), true);
     vesk::xvector<int32> numbers;
-    CHECK(Refuses({1, 0, 0, 0, 0}, numbers, limits), false);
-    CHECK(Refuses({2, 0, 0, 0, 0, 0, 0, 0, 0}, numbers, limits), true);
+    CHECK(Refuses({2, 0, 0, 0, 0, 0, 0, 0, 0}, numbers, limits) && !Refuses({1, 0, 0, 0, 0}, numbers, limits), true);
     vesk::xvector<vesk::cref<vesk::int8>> references;
     CHECK(Refuses({2, 1, 7, 2, 8}, references, limits), true);
     delete references[0].Get();

@@ -170,25 +170,27 @@ ROW(JsonErrors) {
              {"[-2147483648, \"2147483647\"]", "[-2147483648,2147483647]"}}) {
         CHECK(Read<Ints>(text), error);
     }
-    CHECK(Read<vesk::string8>("\"\xff\""), "line 1, column 2: text is not UTF-8");
-    CHECK(Read<vesk::string8>("\"\xed\xa0\x80\""), "line 1, column 2: text is not UTF-8");
-    CHECK(Read<vesk::string8>("\"\n\""), "line 1, column 2: control character in a string");
+    for (auto [text, error] : std::initializer_list<std::pair<const char*, const char*>>{
+             {"\xff", "2: text is not UTF-8"},
+             {"\xed\xa0\x80", "2: text is not UTF-8"},
+             {"\n", "2: control character in a string"},
+             {"\\x", "3: unknown escape"},
+             {"\\u12g4", "6: expected four hexadecimal digits"},
+             {"\\ud800", "1: lone surrogate in a string of UTF-8"}}) {
+        CHECK(Read<vesk::string8>(vxMakeString('"' << text << '"')), vxMakeString("line 1, column " << error));
+    }
     CHECK(Read<vesk::string8>("\"a"), "line 1, column 1: string without an end");
-    CHECK(Read<vesk::string8>("\"\\x\""), "line 1, column 3: unknown escape");
-    CHECK(Read<vesk::string8>("\"\\u12g4\""), "line 1, column 6: expected four hexadecimal digits");
-    CHECK(Read<vesk::string8>("\"\\ud800\""), "line 1, column 1: lone surrogate in a string of UTF-8");
     CHECK(Read<vesk::string8>("\"\\ud83d\\ude00\\/\\u0041\""), "\"😀/A\"");
     CHECK(Json(vesk::string8("\xff")), "string is not UTF-8");
-    CHECK(Read<vesk::float64>("1e999"), "line 1, column 1: out of range");
     for (auto text : {"1e-999", "0.0001e-330", "0.1e-99999999999999999999"}) CHECK(Read<vesk::float64>(text), "0");
-    for (auto text : {"100000e305", "1e99999999999999999999", "-1e+309"}) {
+    for (auto text : {"1e999", "100000e305", "1e99999999999999999999", "-1e+309"}) {
         CHECK(Read<vesk::float64>(text), "line 1, column 1: out of range");
     }
     CHECK(Read<vesk::float32>("1e39"), "line 1, column 1: out of range");
-    CHECK(Read<vesk::float64>("\"-Infinity\""), "\"-Infinity\"");
-    CHECK(Read<vesk::float64>("\"NaN\""), "\"NaN\"");
-    CHECK(Read<vesk::uint64>("18446744073709551616"), "line 1, column 1: out of the range of uint64");
-    CHECK(Read<vesk::uint64>("-1"), "line 1, column 1: out of the range of uint64");
+    for (auto text : {"\"-Infinity\"", "\"NaN\""}) CHECK(Read<vesk::float64>(text), text);
+    for (auto text : {"18446744073709551616", "-1"}) {
+        CHECK(Read<vesk::uint64>(text), "line 1, column 1: out of the range of uint64");
+    }
     CHECK(Read<vesk::uint128>("\"340282366920938463463374607431768211456\""),
           "line 1, column 1: out of the range of uint128");
     CHECK(Read<bool>("1"), "line 1, column 1: expected true or false");
@@ -337,22 +339,16 @@ ROW(Access) {
     const vesk::Value value = vesk::Value::Of(r);
     CHECK(vxMakeString(value.Count() << value.Name(0) << value.At(1).Text()), "41flag-128");
     CHECK(value.Find("parts[1].marks[0]").As<vesk::int8>(), 1);
-    CHECK(value.Find("deep[-4][0][a]").Text(), "1.5");
-    CHECK(value.Find("byColour").Text(), "[(Green,3)]");
+    CHECK(vxMakeString(value.Find("deep[-4][0][a]").Text() << value.Find("byColour").Text()), "1.5[(Green,3)]");
     for (const char* path : {"parts[9]", "parts[-1]", "parts[01]", "parts[", "[", "nothing.at.all"}) {
         if (value.Find(path)) CHECK(path, "nothing");
     }
-    CHECK(value.Find("parts").TypeName(), "xvector<kinds::Part>");
-    CHECK(value.Find("typedefd").TypeName(), "xvector<int32>");
+    CHECK(vxMakeString(value.Find("parts").TypeName() << value.Find("typedefd").TypeName()), "xvector<kinds::Part>xvector<int32>");
     value.Find("parts[1].name").Set(vesk::string8("set"));
-    CHECK(r.parts[1].name, "set");
     value.Find("bits[1]").Set(true);
-    CHECK(bool(r.bits[1]), true);
     vesk::FromJson(value.Find("byName[$k]"), Q("{'number':70}"));
-    CHECK(r.byName["$k"].number, 70);
-    CHECK(Throws([&] { value.Find("i8").Set(int32(1)); }), true);
-    CHECK(Throws([&] { value.At(41); }), true);
-    CHECK(Throws([&] { vesk::Value().Set(1); }), true);
+    CHECK(vxMakeString(r.parts[1].name << bool(r.bits[1]) << r.byName["$k"].number), "settrue70");
+    CHECK(Throws([&] { value.Find("i8").Set(int32(1)); }) && Throws([&] { value.At(41); }) && Throws([] { vesk::Value().Set(1); }), true);
     CHECK(vesk::DumpText(value.Find("parts[0]")),
           "value: kinds::Part\n    number = 7\n    name = \"p\"\n    marks: xvector<int8>, 2\n        [0] = 1\n"
           "        [1] = -2\n");

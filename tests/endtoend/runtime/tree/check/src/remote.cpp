@@ -73,10 +73,7 @@ ROW(RemoteErrors) {
     auto swap = [&](vesk::string8 text) { return CallError([&] { far->Swap(text, n); }); };
 
     // What a method throws reaches its caller alone; the next call is served.
-    CHECK(swap("standard"), "not today");
-    CHECK(swap("other"), "remote method failed");
-    CHECK(swap("fine"), "none");
-    CHECK(n, -1);
+    CHECK(vxMakeString(swap("standard") << ',' << swap("other") << ',' << swap("fine") << n), "not today,remote method failed,none-1");
     CHECK(wire.errors, "[not today,remote method failed]");
 
     // Exports: null and names without a factory are refused and leave nothing behind.
@@ -122,17 +119,16 @@ ROW(RemoteMessages) {
         wire.channel.Client().Receive(reply);
         return vxMakeString(wire.errors << reply.size());
     };
-    CHECK(send({}), "[read beyond the end of an archive]0");
-    CHECK(send({255}), "[read beyond the end of an archive]0");
+    for (Bytes const& message : {Bytes{}, Bytes{255}, Message(number, 2, 0, vesk::int16(3))}) {
+        CHECK(send(message), "[read beyond the end of an archive]0");
+    }
     CHECK(send(Message(0, 0, 0)), "[no such remote object]0");
-    CHECK(send(Message(number, 6, 0)), "[no such remote method]0");
-    CHECK(send(Message(number, 4294967295u, 0)), "[no such remote method]0");
-    CHECK(send(Message(number, 2, 0, vesk::int16(3))), "[read beyond the end of an archive]0");
-    CHECK(send(Message(number, 2, 0, int32(3), vesk::int8(1))), "[bytes behind the arguments]0");
-    CHECK(send(Message(number, 3, 0, vesk::int8(1))), "[bytes behind the arguments]0");
+    for (vesk::uint32 method : {6u, 4294967295u}) CHECK(send(Message(number, method, 0)), "[no such remote method]0");
+    for (Bytes const& message : {Message(number, 2, 0, int32(3), vesk::int8(1)), Message(number, 3, 0, vesk::int8(1))}) {
+        CHECK(send(message), "[bytes behind the arguments]0");
+    }
     CHECK(calc.notified, 0);
-    CHECK(send(Message(number, 2, 0, int32(3))), "[]0");
-    CHECK(calc.notified, 3);
+    CHECK(vxMakeString(send(Message(number, 2, 0, int32(3))) << calc.notified), "[]03");
     CHECK(send(Message(number, 0, 9)), vxMakeString("[read beyond the end of an archive]" << 36));
 
     // Too large, either way.
@@ -183,8 +179,7 @@ ROW(RemoteAnswers) {
     int32 kept = 0;
     auto add = [&](Bytes const& behind) {
         int32 sum = 0;
-        reply = {++answer};
-        reply.insert(reply.end(), behind.begin(), behind.end());
+        reply = Joined({++answer}, behind);
         const vesk::xstring error = CallError([&] { far->Add(1, "", sum); });
         kept = sum;
         return error;
