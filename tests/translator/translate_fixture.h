@@ -83,15 +83,6 @@ class TranslateTest : public WorldTest {
     const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
     return Section(header, "//\n", "int end;\n");
   }
-  void AssertHeader(const std::string& text, const std::string& header) {
-    ASSERT_EQ(header, TranslateHeader(text).header);
-  }
-  // Both texts with their tables on lines.
-  void AssertGenerated(const std::string& text, const std::string& header, const std::string& tail) {
-    const Generated generated = TranslateHeader(text);
-    ASSERT_EQ(header, Folded(generated.header));
-    ASSERT_EQ(tail, Folded(generated.tail));
-  }
 
   // What stands behind the first `begin`, up to the first `end` behind it; all the rest when `end` is empty.
   static std::string Section(const std::string& text, const std::string& begin, const std::string& end) {
@@ -125,10 +116,6 @@ class TranslateTest : public WorldTest {
     return result;
   }
 
-  // The tail of an element of the root name space; `record` is indented. `element`: as printed, "$enum+ E".
-  static std::string TailText(const std::string& element, const std::string& record) {
-    return "\n//### " + element + "\nnamespace vesk { XTarget* app_GetXTarget(); }\n" + record;
-  }
   // The printed form of the error that the translation of `text` raises.
   std::string ErrorOf(const std::string& name, const std::string& text) {
     try {

@@ -29,7 +29,7 @@ ROW(Reflection) {
     CHECK(record.m_size, sizeof(point));
     CHECK(*reinterpret_cast<int32*>(reinterpret_cast<char*>(&point) + record.m_fields[1].m_offset), 4);
     typedef int32 (*SumFn)(shapes::Point const*, int32);
-    vesk::ReflectedMethod const& sum = record.m_methods[0];
+    auto const& sum = record.m_methods[0];
     CHECK(vxMakeString(sum.m_name << reinterpret_cast<SumFn>(sum.m_function)(&point, 5)), "Sum12");
     CHECK(sum.m_isConst && !record.m_methods[1].m_isConst, true);
     CHECK(vesk::TargetOf(record)->m_name, "shapes");
