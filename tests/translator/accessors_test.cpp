@@ -100,15 +100,15 @@ TEST_F(AccessorsTest, NestingIsBounded) {
   for (int i = 0; i < 60; ++i) type = "DynArray<" + type + " >";
   std::string models = "$model M0 { bool x; }; ";
   for (int i = 1; i < 60; ++i) models += "$model M" + ToString(i) + " { M" + ToString(i - 1) + " x; }; ";
-  AssertErrors({{"$model M { " + type + " x; };", 1, "Field x : type nested too deeply"},
-                {models, 1, "Field x : type nested too deeply"}});
+  for (const std::string& text : {"$model M { " + type + " x; };", models})
+    AssertError(text, 1, "Field x : type nested too deeply");
   // one of fields that double grows faster
   std::string ladder = "$model M0 { bool x; bool y; }; ";
   for (int i = 1; i < 16; ++i) {
     const std::string below = "M" + ToString(i - 1);
     ladder += "$model M" + ToString(i) + " { " + below + " x; " + below + " y; };\n";
   }
-  AssertErrors({{ladder, 12, "Field y : $model M12 has more than 10000 fields, with those of the models in it"}});
+  AssertError(ladder, 12, "Field y : $model M12 has more than 10000 fields, with those of the models in it");
 }
 
 }  // namespace

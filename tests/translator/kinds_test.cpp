@@ -25,16 +25,12 @@ TEST_F(KindsTest, DeclarationsInSeveralFiles) {
 
 TEST_F(KindsTest, InLibraries) {
   MakeWorld(TargetType::StaticLibrary);
-  AssertMessages(
-      {
-          {"$function void f() { }",
-           "t.cpp(1) : warning W1012 : $function f defined in library without prior declaration\n"},
-          {"$function void f(); $function void f() { }", ""},
-          {"$function inline void f() { }", ""},
-          {"$function+ void f();",
-           "t.cpp(1) : warning W1008 : $function+ f doesn't appear in public header of library\n"},
-      },
-      "t.cpp");
+  AssertMessages("$function void f() { }",
+                 "t.cpp(1) : warning W1012 : $function f defined in library without prior declaration\n", "t.cpp");
+  for (const char* text : {"$function void f(); $function void f() { }", "$function inline void f() { }"})
+    AssertMessages(text, "", "t.cpp");
+  AssertMessages("$function+ void f();",
+                 "t.cpp(1) : warning W1008 : $function+ f doesn't appear in public header of library\n", "t.cpp");
   MakeWorld(TargetType::StaticLibrary);
   Translate("api/p.h",
             "@import \"Vesk/vxObject/IObject.h\"\n$function void f();\n$var int32 v;\n$typedef int32 T;\n"
@@ -80,7 +76,7 @@ TEST_F(KindsTest, LadderOfDiamonds) {
     const std::string heading = ToString(i + 1) + " : A" + ToString(i) + ", B" + ToString(i) + " { }; ";
     text += "$interface A" + heading + "$interface B" + heading + "\n";
   }
-  AssertErrors({{text, 14, "Too many base interfaces of $interface A13"}});
+  AssertError(text, 14, "Too many base interfaces of $interface A13");
 }
 
 // Functions are friends where they stand in a class, not where it is only called nested.
@@ -120,8 +116,8 @@ TEST_F(KindsTest, VisitingOfTheContainingObject) {
 TEST_F(KindsTest, SectionsOfNodesStandOnce) {
   for (const char* word : {"calc", "create", "destroy", "visit", "evictable", "evict", "invalidate"}) {
     const std::string section = std::string(word) + " { } ";
-    AssertErrors({{section + section + "; };", 2, "'" + std::string(word) + "' already specified"}},
-                 "$struct S {\n$dep int32 a ");
+    AssertError("$struct S {\n$dep int32 a " + section + section + "; };", 2,
+                "'" + std::string(word) + "' already specified");
   }
 }
 

@@ -114,7 +114,7 @@ TEST_F(LoopTest, InitAndUninit) {
 TEST_F(LoopTest, ErrorsOfDirectives) {
   std::string nested;
   for (int i = 0; i < 1001; ++i) nested += "namespace n {\n";
-  AssertErrors({{nested, 1001, "Declarations nested too deeply"}});
+  AssertError(nested, 1001, "Declarations nested too deeply");
 }
 
 // Errors in expanded text are told at the source that it came from.

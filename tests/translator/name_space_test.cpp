@@ -66,14 +66,13 @@ TEST_F(LookUp, TextOutsideOfNameSpaces) {
 
 // Without the key there are two forms, wherever the word stands; what no key makes C++ is an error with it, too.
 TEST_F(LookUp, FormsThatAreErrors) {
-  const std::vector<ErrorCase> always = {{"namespace ;", 1, "Expected identifier after namespace when read ;"},
-                                         {"\nnamespace 5 { }", 2, "Expected identifier after namespace when read 5"},
-                                         {"int a;\nnamespace", 2, "Expected identifier after namespace when read EOS"}};
-  AssertErrors(always);
   EXPECT_EQ("", Fault("#define OPEN namespace x {\n$struct S { }; $type+ x::S; }"));
-  MakeWorld(TargetType::Application);
-  settings.modernCpp = true;
-  AssertErrors(always);
+  for (const bool isModern : {false, true}) {
+    settings.modernCpp = isModern;
+    AssertError("namespace ;", 1, "Expected identifier after namespace when read ;");
+    AssertError("\nnamespace 5 { }", 2, "Expected identifier after namespace when read 5");
+    AssertError("int a;\nnamespace", 2, "Expected identifier after namespace when read EOS");
+  }
 }
 
 // Each of them took a second or more where the text behind was read for each.
@@ -178,17 +177,14 @@ TEST_F(LookUp, ForwardDeclarationsInClasses) {
 TEST_F(NameSpaceTest, WarningsOfLibraries) {
   for (TargetType target : {TargetType::StaticLibrary, TargetType::DynamicLinkLibrary}) {
     MakeWorld(target);
-    AssertMessages({
-        {"$class+ A { };", "t.h(1) : warning W1008 : $class+ A doesn't appear in public header of library\n"},
-        {"$class A { }; $mixin M { };", ""},
-    });
-    AssertMessages(
-        {{"\n$class A { };", "app/pub/t.h(2) : warning W1009 : $class A not exported in public header of library\n"},
-         {"$class+ A { }; $mixin M { };", ""}},
-        "pub/t.h");
+    AssertMessages("$class+ A { };", "t.h(1) : warning W1008 : $class+ A doesn't appear in public header of library\n");
+    AssertMessages("$class A { }; $mixin M { };", "");
+    AssertMessages("\n$class A { };",
+                   "app/pub/t.h(2) : warning W1009 : $class A not exported in public header of library\n", "pub/t.h");
+    AssertMessages("$class+ A { }; $mixin M { };", "", "pub/t.h");
   }
   MakeWorld(TargetType::Application);
-  AssertMessages({{"$class A { }; $class+ B { };", ""}}, "pub/t.h");
+  AssertMessages("$class A { }; $class+ B { };", "", "pub/t.h");
 }
 
 TEST_F(NameSpaceTest, WarningSwitches) {

@@ -8,28 +8,22 @@ class TextChecksTest : public TranslateTest {
  protected:
   // What is printed beside the W1002 of things that nobody registers.
   void AssertWarned(const std::string& text, const std::string& warning) {
-    AssertMessages({{"$warning(disable: 1002 1007)\n" + text, warning}});
+    AssertMessages("$warning(disable: 1002 1007)\n" + text, warning);
   }
 };
 
-TEST_F(TextChecksTest, AModelThatHidesAnother) {
+TEST_F(TextChecksTest, AModelThatHidesAnotherFarBelow) {
   settings.compilableText = true;
   const std::string models = "$mixin M : model { int32 a; } { };\n$model Own { int32 b; };\n";
   const std::string warning =
       "t.h(4) : warning W1019 : $struct S archives and prints the model of $mixin M in place of its own: write one "
       "model that has the fields of both\n";
-  AssertWarned(models + "$struct S : model Own mixin [ M ] { };", warning);
-  AssertWarned(models + "$struct S : model { int32 c; } mixin [ M ] { };", warning);
   std::string ladder = models + "$mixin L0 : mixin [ M ] { };";
   for (int step = 0; step < 60; ++step) {
     const std::string below = std::to_string(step);
     ladder += "$mixin L" + std::to_string(step + 1) + " : mixin [ L" + below + " L" + below + " ] { };";
   }
   AssertWarned(ladder + " $struct S : model Own mixin [ L60 ] { };", warning);
-  AssertWarned(models + "$mixin L : mixin [ M ] { }; $struct S : model Own mixin [ L ] { };", warning);
-  AssertWarned(models + "$struct S : mixin [ M ] { };", "");
-  settings.compilableText = false;
-  AssertWarned(models + "$struct S : model Own mixin [ M ] { };", "");
 }
 
 TEST_F(TextChecksTest, AReleaseBehindThatOfAModel) {

@@ -126,31 +126,15 @@ class TranslateTest : public WorldTest {
     }
   }
 
-  // Tables of header texts and the error that each raises, or the messages that its translation prints, in a new world
-  // for each, of the kind that `app` has. The import of IObject.h stands on the first line of the text. `before` and
-  // `after` stand around the text of each case.
-  struct ErrorCase {
-    std::string text;
-    int line;
-    std::string error;
-  };
-  struct MessageCase {
-    std::string text, message;
-  };
-  void AssertErrors(const std::vector<ErrorCase>& cases, const std::string& before = {},
-                    const std::string& after = {}) {
-    for (const auto& [text, line, error] : cases) {
-      SCOPED_TRACE(text);
-      EXPECT_EQ("t.h(" + ToString(line) + ") : error : " + error, ErrorInNewWorld("t.h", before + text + after));
-    }
+  // The error that a header raises, or the messages that its translation prints, in a new world of the kind that `app`
+  // has. The import of IObject.h stands on the first line of the text.
+  void AssertError(const std::string& text, int line, const std::string& error) {
+    EXPECT_EQ("t.h(" + ToString(line) + ") : error : " + error, ErrorInNewWorld("t.h", text)) << text;
   }
-  void AssertMessages(const std::vector<MessageCase>& cases, const std::string& name = "t.h") {
-    for (const auto& [text, message] : cases) {
-      SCOPED_TRACE(text);
-      const std::string error = ErrorInNewWorld(name, text);
-      EXPECT_EQ("no error", error.substr(0, 8)) << error;
-      EXPECT_EQ(message, Messages());
-    }
+  void AssertMessages(const std::string& text, const std::string& messages, const std::string& name = "t.h") {
+    const std::string error = ErrorInNewWorld(name, text);
+    EXPECT_EQ("no error", error.substr(0, 8)) << error;
+    EXPECT_EQ(messages, Messages()) << text;
   }
 
   // What is told of a header in a new world: its error, or else its messages.

@@ -36,8 +36,7 @@ ROW(Copies) {
     vesk::ReflectedInterface other = record;
     other.m_numInheritedMethods += 1;
     Linked linked;
-    CHECK(bool(linked.QueryInterface(record).m_self), true);
-    CHECK(bool(linked.QueryInterface(other).m_self), false);
+    CHECK(linked.QueryInterface(record).m_self && !linked.QueryInterface(other).m_self, true);
     const vesk::ReflectedClass copy = vesk::GetReflectedClass<Linked>();
     vesk::ReflectedClass unlike = copy;
     unlike.m_size += 1;
@@ -47,8 +46,7 @@ ROW(Copies) {
         CHECK(vesk::RegisterReflectedClass(&unlike, &target) == vesk::NSE_OK, false);
         unlike.m_name = "Alone";
         CHECK(vesk::RegisterReflectedClass(&unlike, &target) == vesk::NSE_OK, true);
-        CHECK(vesk::TargetOf(unlike)->m_name, "plug-in");
-        CHECK(vesk::TargetOf(copy)->m_name, "check");
+        CHECK(vxMakeString(vesk::TargetOf(unlike)->m_name << ' ' << vesk::TargetOf(copy)->m_name), "plug-in check");
         vesk::UnregisterTarget(&target);
         CHECK(vesk::Find<vesk::ReflectedClass>("Alone") == nullptr, true);
     }

@@ -92,8 +92,7 @@ ROW(JsonBothWays) {
     style.m_indent = 2;
     CHECK(vesk::ToJsonText(part, style),
           "{\n  \"number\": 1,\n  \"name\": \"n\",\n  \"marks\": [\n    1,\n    -2\n  ]\n}");
-    CHECK(ReadError(part, Q(" { 'name' : 'm' } ")), "none");
-    CHECK(Json(part), Q("{'number':1,'name':'m','marks':[1,-2]}"));
+    CHECK(ReadError(part, Q(" { 'name' : 'm' } ")) + Json(part), Q("none{'number':1,'name':'m','marks':[1,-2]}"));
 
     // A model, with containers of all kinds in it.
     Everything all;
@@ -102,8 +101,7 @@ ROW(JsonBothWays) {
     all.grid[1][2].height = 6;
     all.any = Size(3);
     Everything read;
-    CHECK(ReadError(read, Json(all)), "none");
-    CHECK(read == all, true);
+    CHECK(ReadError(read, Json(all)) == "none" && read == all, true);
 
     // Variants: items by name, and by their archive where the record tells nothing.
     vesk::xvector<Value> values = {Value(), Value(vesk::string8("t")), Value::ratio(2.5), Value::list({1, 2}),
@@ -112,8 +110,7 @@ ROW(JsonBothWays) {
           Q("[{'int32':7},{'string8':'t'},{'ratio':2.5},{'list':{'$bytes':'020100000002000000'}},"
           "{'kinds::Size':{'width':3,'height':3,'colour':'Red','level':'Mid'}},{'numbers':[4]}]"));
     vesk::xvector<Value> back;
-    CHECK(ReadError(back, Json(values)), "none");
-    CHECK(back == values, true);
+    CHECK(ReadError(back, Json(values)) == "none" && back == values, true);
 }
 
 // At the ends of blocks and across them; 512 bytes in one library.
@@ -304,8 +301,7 @@ ROW(JsonObjects) {
     r.objects["doc"] = vesk::pref<vesk::IObject>(vesk::ptr<vesk::IObject>(&doc));
     doc.next = nullptr;
     Reflected other;
-    CHECK(ReadError(other, Json(r)), "none");
-    CHECK(Json(other), Json(r));
+    CHECK(ReadError(other, Json(r)) + Json(other), "none" + Json(r));
     CHECK(*other.shared == part, true);
     delete other.shared.Get();
     other.objects["doc"]->DestroyObject();
@@ -363,8 +359,7 @@ ROW(Access) {
         vesk::ModelHook hook([&](vesk::ModelChange const& change) { changes.push_back(change.PathText()); });
         vesk::Value::Of(watched).Find("size.width").Set(int32(5));
     }
-    CHECK(changes, "[size.width]");
-    CHECK(watched.area.read(), 15);
+    CHECK(vxMakeString(changes << watched.area.read()), "[size.width]15");
     Sources sources;
     sources.number = 20;
     sources.tiny = 1;
