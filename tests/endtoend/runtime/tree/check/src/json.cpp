@@ -92,7 +92,7 @@ ROW(JsonBothWays) {
     style.m_indent = 2;
     CHECK(vesk::ToJsonText(part, style),
           "{\n  \"number\": 1,\n  \"name\": \"n\",\n  \"marks\": [\n    1,\n    -2\n  ]\n}");
-    CHECK(ReadError(part, Q(" { 'name' : 'm' } ")) + Json(part), Q("none{'number':1,'name':'m','marks':[1,-2]}"));
+    CHECK(vxMakeString(ReadError(part, Q(" { 'name' : 'm' } ")) << Json(part)), Q("none{'number':1,'name':'m','marks':[1,-2]}"));
 
     // A model, with containers of all kinds in it.
     Everything all;
@@ -301,7 +301,7 @@ ROW(JsonObjects) {
     r.objects["doc"] = vesk::pref<vesk::IObject>(vesk::ptr<vesk::IObject>(&doc));
     doc.next = nullptr;
     Reflected other;
-    CHECK(ReadError(other, Json(r)) + Json(other), "none" + Json(r));
+    CHECK(ReadError(other, Json(r)) == "none" && Json(other) == Json(r), true);
     CHECK(*other.shared == part, true);
     delete other.shared.Get();
     other.objects["doc"]->DestroyObject();
