@@ -8,6 +8,7 @@
 #include "builder/tool_names.h"
 #include "builder/tool_output.h"
 #include "text/paths.h"
+#include "text_cases.h"
 #include "translator/file/translate_file.h"
 #include "workspace/switch_blocks.h"
 #include "world_fixture.h"
@@ -230,46 +231,14 @@ TEST_F(ToolsTest, OneObjectOfTwoSources) {
 
 // --- Output
 
+// Errors and warnings of each compiler.
 TEST_F(ToolsTest, MessagesAreCounted) {
   AddApp("Application", "");
-  const auto kGcc = CompilerKind::gcc, kVisual = CompilerKind::vc9;
-  const struct {
-    CompilerKind compiler;
-    const char* text;
-    int64_t errors, warnings;
-  } cases[] = {
-      {kVisual, "a.cpp(12) : error C2143: syntax error", 1, 0},
-      {kVisual, "a.cpp(12): warning C4100: x", 0, 1},
-      {kVisual, "  a.cpp(12)\t:\twarn", 0, 1},
-      {kVisual, "a.cpp(12) : fatal error C1083: x", 0, 0},
-      {kVisual, "a.cpp(12) : Error", 0, 0},
-      {kVisual, "a.cpp : error C2143: x", 0, 0},
-      {kVisual, "a.cpp() : error", 0, 0},
-      {kVisual, "a.cpp(1x) : error", 0, 0},
-      {kVisual, "a.cpp(12 ) : error", 0, 0},
-      {kVisual, "a.cpp(12) error", 0, 0},
-      {kVisual, "note: see (3) : error", 1, 0},
-      {kVisual, "f((3) : error", 1, 0},
-      {kVisual, "a(1) : error b(2) : error c(3) : warning", 2, 1},
-      {kVisual, "a \"b(2) : error", 0, 0},
-      {kVisual, "a*b(2) : error", 0, 0},
-      {kVisual, "a(99999999999999999999999) : error", 1, 0},
-      {kVisual, "a(1) : error\n\n  \nb(2) : warning\n", 1, 1},
-      {kVisual, "a.cpp:12:3: error: x", 0, 0},
-      {kGcc, "a.cpp:12:3: error: x", 1, 0},
-      {kGcc, "a.cpp:12: fatal error: x", 1, 0},
-      {kGcc, "a.cpp:12:3: warning: x(3) : error", 1, 1},
-      {kGcc, "In file included from a.cpp:12:", 0, 0},
-      {kGcc, "a.cpp:12:3: note: x", 0, 0},
-      {kGcc, "a.cpp(12): error: x", 1, 0},
-      {kGcc, "", 0, 0},
-  };
-  for (const auto& test : cases) {
-    Builder(test.compiler);
-    const ToolMessages found = ScanToolOutput(*builder, test.text);
-    EXPECT_EQ(test.errors, found.errors) << test.text;
-    EXPECT_EQ(test.warnings, found.warnings) << test.text;
-    EXPECT_EQ(test.text, trace);
+  for (const auto& [compiler, text, counts] : TextCasesOf("builder/cases/messages.txt")) {
+    Builder(compiler == "gcc" ? CompilerKind::gcc : CompilerKind::vc9);
+    const ToolMessages found = ScanToolOutput(*builder, text);
+    EXPECT_EQ(counts, std::to_string(found.errors) + " " + std::to_string(found.warnings)) << text;
+    EXPECT_EQ(text, trace);
   }
 }
 

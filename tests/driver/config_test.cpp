@@ -3,6 +3,7 @@
 #include "driver/config_parser.h"
 #include "driver/configured_paths.h"
 #include "driver/run_workspace.h"
+#include "text_cases.h"
 #include "world_fixture.h"
 
 namespace qrex {
@@ -124,20 +125,8 @@ TEST_F(ConfigTest, Launcher) {
 }
 
 TEST_F(ConfigTest, Messages) {
-  for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
-           {"\nmode clean", "(2) : Expected = after mode when read clean"},
-           {"mode = Clean", "(1) : Invalid option : Clean"},
-           {"compiler =", "(1) : Invalid option : EOS"},
-           {"runtime = \"built\"", "(1) : Invalid option : \"built\""},
-           {"\n\nmoed = clean", "(3) : Syntax error: moed"},
-           {"targetXP = \"true\"", "(1) : Expected false/true after = when read \"true\""},
-           {"jobs = -1", "(1) : Expected number after = when read -"},
-           {"INCLUDE(\"a\") += \"b\"", "(1) : Expected { after += when read \"b\""},
-           {"config = (\"a\"", "(1) : Expected ) after \"a\" when read EOS"},
-           {"$\"a\" = \"b\"", "(1) : Expected identifier after $ when read \"a\""},
-           {"$a \"b\"", "(1) : Expected = after a when read \"b\""},
-       }) {
-    AssertFails(text, std::string("\nmain.qrex") + message + "\n");
+  for (const auto& [name, text, message] : TextCasesOf("driver/cases/config_messages.txt")) {
+    AssertFails(text, "\nmain.qrex" + message + "\n");
   }
   for (const std::string path : {"none", "\xFF"}) {
     AssertFails("@import \"" + path + "\"", "\nmain.qrex(1) : Couldn't open file " + path +

@@ -131,7 +131,7 @@ def test_memory(binary):
     need("g++")
     workspace, root = translate(binary, "memory.qrws", "compilableText = true")
     with workspace:
-        link(workspace, ADDRESSES, [f"{root}/memory/src/{name}.cpp" for name in ("containers", "graph", "memory", "values")], "memory")
+        link(workspace, ADDRESSES, [f"{root}/memory/src/{name}.cpp" for name in ("graph", "memory")], "memory")
         holds(workspace.shell("./memory"), " runs, 0 failures\n")
 
 

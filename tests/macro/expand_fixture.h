@@ -8,6 +8,7 @@
 
 #include "macro/expand.h"
 #include "macro/mpfw_parser.h"
+#include "text_cases.h"
 
 namespace qrex {
 
@@ -33,6 +34,11 @@ class ExpandTest : public ::testing::Test, public ImportHandler {
       void TestBody() override {}
     } fresh;
     return fresh.Expand(text);
+  }
+
+  static void AssertCases(const std::string& file) {
+    for (const auto& [name, input, expected] : TextCasesOf(file))
+      EXPECT_EQ(expected, ExpandAfresh(input)) << name << "\n" << input;
   }
 
   bool ImportPath(const std::string& path, const char*) override {

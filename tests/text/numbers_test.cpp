@@ -32,12 +32,10 @@ TEST(NumbersTest, FromText) {
   EXPECT_EQ("-42", Parse<int64_t>("\r\n\t-42"));
   EXPECT_EQ("255", Parse<uint8_t>("fF", 16));
   EXPECT_EQ("18446744073709551615", Parse<uint64_t>("18446744073709551615"));
-  EXPECT_EQ("String doesn't represent a number 0", Parse<int32_t>("42 "));
-  EXPECT_EQ("String doesn't represent a number 0", Parse<int32_t>("\v42"));
-  EXPECT_EQ("String doesn't represent a number 0", Parse<int32_t>("x"));
-  EXPECT_EQ("String doesn't represent a number 0", Parse<int32_t>(std::string("4\0", 2)));
-  EXPECT_EQ("Empty string 0", Parse<int32_t>(""));
-  EXPECT_EQ("Empty string 0", Parse<int32_t>(" \n"));
+  for (const std::string& text : {std::string("42 "), std::string("\v42"), std::string("x"), std::string("4\0", 2)}) {
+    EXPECT_EQ("String doesn't represent a number 0", Parse<int32_t>(text)) << text;
+  }
+  for (const char* text : {"", " \n"}) EXPECT_EQ("Empty string 0", Parse<int32_t>(text));
   EXPECT_EQ("Out of range 44", Parse<uint8_t>("300"));
   EXPECT_EQ("Out of range 255", Parse<uint8_t>("-1"));
   EXPECT_EQ("Out of range -128", Parse<int8_t>("128"));

@@ -4,10 +4,11 @@
 // texts of `dll_` are whole; others are expected without the lines around each header, and with tables and traits on
 // one line.
 //
-// `scripts/test --update` writes what is expected anew, and shows what changed.
+// `scripts/test --update` writes what is expected anew, and shows what changed. What is told of headers stands in `told`.
 #include <cstdlib>
 #include <filesystem>
 
+#include "text_cases.h"
 #include "translator/translate_fixture.h"
 
 namespace qrex {
@@ -15,11 +16,12 @@ namespace {
 
 const std::string kFolder = QREX_SOURCE_DIR "/tests/translator/cases/";
 
-std::vector<std::string> CaseNames() {
+std::vector<std::string> NamesIn(const std::string& folder, const std::string& extension) {
   std::vector<std::string> names;
-  for (const auto& entry : std::filesystem::directory_iterator(kFolder)) {
+  for (const auto& entry : std::filesystem::directory_iterator(folder)) {
     const std::string name = entry.path().filename().string();
-    if (name.ends_with(".h") && !name.ends_with(".expected.h")) names.push_back(name.substr(0, name.size() - 2));
+    if (!name.ends_with(extension) || name.ends_with(".expected.h")) continue;
+    names.push_back(name.substr(0, name.size() - extension.size()));
   }
   std::sort(names.begin(), names.end());
   return names;
@@ -80,7 +82,28 @@ TEST_P(CasesTest, GivesWhatIsExpected) try {
   FAIL() << ExceptionText(exception);
 }
 
-INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(CaseNames()), [](const auto& each) { return each.param; });
+INSTANTIATE_TEST_SUITE_P(, CasesTest, ::testing::ValuesIn(NamesIn(kFolder, ".h")),
+                         [](const auto& each) { return each.param; });
+
+// Headers with what is told of each: an error, or else messages. What `compilable_` is told of with the key is no fault
+// without it.
+class ToldTest : public TranslateTest, public ::testing::WithParamInterface<std::string> {};
+
+TEST_P(ToldTest, IsWhatIsExpected) {
+  const bool isCompilable = GetParam().starts_with("compilable_");
+  for (const auto& [name, text, expected] : TextCasesOf("translator/told/" + GetParam() + ".txt")) {
+    SCOPED_TRACE(name + "\n" + text);
+    settings.compilableText = isCompilable;
+    EXPECT_EQ(expected, Told(text));
+    settings.compilableText = false;
+    if (isCompilable) {
+      EXPECT_EQ("", Told(text));
+    }
+  }
+}
+
+INSTANTIATE_TEST_SUITE_P(, ToldTest, ::testing::ValuesIn(NamesIn(QREX_SOURCE_DIR "/tests/translator/told", ".txt")),
+                         [](const auto& each) { return each.param; });
 
 }  // namespace
 }  // namespace qrex

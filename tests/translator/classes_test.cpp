@@ -87,45 +87,5 @@ TEST_F(ClassesTest, RecordsOfQualifiers) {
   }
 }
 
-TEST_F(ClassesTest, Errors) {
-  EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$struct A { };"));
-  AssertErrors({
-      // the heading
-      {"$mixin+\nM { };", 2, "'+' modifier not permitted on $mixin"},
-      {"$struct A { $class+ B { }; };", 1, "'+' modifier not permitted on nested classes or structs"},
-      {"$struct implement A { };", 1, "'implement' modifier only permitted on $adt"},
-      {"$struct 1", 1, "Expected identifier after struct when read 1"},
-      {"\n$adt implement A { };", 2, "Can't implement undefined $adt A"},
-      {"$adt A; $adt implement A { };", 1, "Can't implement undefined $adt A"},
-      {"$adt A { }; $adt implement A { }; $adt implement A { };", 1, "Repeated implementation of $adt A"},
-      {"$adt A { }; $adt implement A;", 1, "Forward declaration of $adt A incompatible with 'implements'"},
-      {"$adt A { }; $adt implement A <<os>>;", 1, "Forward declaration of $adt A incompatible with 'implements'"},
-      {"$adt A { }; $adt A { };", 1, "Repeated definition of $adt A"},
-      {"$struct A <<os>>; $struct A <<os>>;", 1, "$struct A already deferred"},
-      // qualifiers
-      {"$struct A <<\nos bogus>> { };", 2, "Unrecognised qualifier << bogus >> on $struct A"},
-      {"$model A <<-dc>> { };", 1, "Qualifier <<-dc>> invalid for a $model"},
-      {"$struct A { $struct B <<reflect>> { }; };", 1, "Qualifier <<reflect>> invalid for a nested type"},
-      {"$struct A { $struct B <<register>> { }; };", 1, "Qualifier <<register>> invalid for a nested type"},
-      {"$struct A <<nested reflect>> { };", 1, "Qualifier <<reflect>> invalid for a nested type"},
-      {"$struct A <<abstract>> isa vesk::IPersistable { };", 1, "IPersistable classes must have a default constructor"},
-      {"$struct A <<-dc>> isa vesk::IPersistable { };", 1, "IPersistable classes must have a default constructor"},
-      {"$struct A <<genop>> { };", 1, "Class $struct A needs to generate ops but doesn't implement IObject"},
-      // isa, bases, head
-      {"$mixin M isa vesk::IObject { };", 1, "'isa' prohibited on a $mixin"},
-      {"$enum E { e }; $struct A isa vesk::IObject,\nE { };", 2, "$interface identifier expected when read $enum E"},
-      {"$class A : { };", 1, "Unexpected { after :"},
-      {"$enum E { e }; $class A : model E { };", 1, "Not a model : {"},
-      {"$struct S { }; $class A : model S { };", 1, "Not a model : {"},
-      // the body
-      {"$struct A { $int32 x; $int32 x; };", 1, "Redefinition of field x"},
-      {"$struct A { $void f([E] e); };", 1, "'[' unexpected.  Polymorphic argument not allowed here"},
-      {"$struct A { $int32 x, y; };", 1, "; expected after field declaration when read ,"},
-      {"$struct+ A { $int x; };", 1, "Can't accept platform dependent type: int"},
-      {"$struct A { $model { int32 x; } $model { } };", 1, "Repeated model declaration"},
-      {"$struct A { $model { int32 x; } $int32 x; };", 1, "Redefinition of field x"},
-  });
-}
-
 }  // namespace
 }  // namespace qrex

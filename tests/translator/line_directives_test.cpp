@@ -2,6 +2,7 @@
 
 #include <gtest/gtest.h>
 
+#include "text_cases.h"
 #include "translate_fixture.h"
 
 namespace qrex {
@@ -24,35 +25,10 @@ class LineDirectivesTest : public TranslateTest {
   }
 };
 
-struct LineCase {
-  const char* source;
-  const char* output;
-};
-
 TEST_F(LineDirectivesTest, LinesAreThoseOfTheSource) {
-  const LineCase kCases[] = {
-      {"int a;\n\n// b\nint c;\n", "#1\nint a;\n\n// b\nint c;\n"},
-      // A few lines that gave nothing are empty ones, more are passed over.
-      {"int a;\n$warning(push);\n\n$warning(pop);\nint b;\n", "#1\nint a;\n;\n\n;\nint b;\n"},
-      {"int a;\n@def M = {\n\n\n\n\n\n\n\n\n}\nint b;\n", "#1\nint a;\n#12\nint b;\n"},
-      // What a call gives stands on its line, but for what ends a line.
-      {"@def M =\n{\n  int a;\n  int b;\n}\nM int c;\nint d;\n", "#6\nint a; int b; int c;\nint d;\n"},
-      {"@def M =\n{\n#if A\nint a; // a\nint b;\n#endif\n}\nM\nint d;\n",
-       "#8\n#if A\n#8\nint a; // a\n#8\nint b;\n#8\n#endif\n#9\nint d;\n"},
-      {"@def M =\n{\n#define X 1 \\\n  2\n}\nM\nint d;\n", "#6\n#define X 1 \\\n  2\n#7\nint d;\n"},
-      {"@def M =\n{\nR\"x(\n)\"\n\n)x\"\n}\nM\nint d;\n", "#8\nR\"x(\n)\"\n\n)x\"\n#9\nint d;\n"},
-      {"@def M =\n{\n/* '\n\" ( */ int a = 1'000;\nchar b = '(';\n}\nM\nint d;\n",
-       "#7\n/* '\n\" ( */\n#7\n int a = 1'000; char b = '(';\nint d;\n"},
-      // Among arguments there are no directives, whatever the branches of a condition leave open.
-      {"@def M =\n{\n1,\n#if 1\n2,\n#endif\n}\nint a = f(\nM\n3);\nint b;\n",
-       "#8\nint a = f(\n1,\n#if 1\n2,\n#endif\n3);\n#11\nint b;\n"},
-      {"#if A\nint a = f(\n#else\nint a = g(\n#endif\n1);\n@def M = {\n\n\n\n\n\n\n\n\n\n}\nint b;\n",
-       "#1\n#if A\nint a = f(\n#else\nint a = g(\n#endif\n1);\n#18\nint b;\n"},
-      // A source that was generated itself.
-      {"int a;\n#line 7 \"t.y\"\nint b;\n@def M = {\n\n\n\n\n\n\n\n\n\n}\nint c;\n",
-       "#1\nint a;\n#7 \"t.y\"\n#7 \"t.y\"\nint b;\n#19 \"t.y\"\nint c;\n"},
-  };
-  for (const LineCase& row : kCases) ASSERT_EQ(row.output, Of(row.source)) << row.source;
+  for (const auto& [name, source, output] : TextCasesOf("translator/line_directives.txt")) {
+    EXPECT_EQ(output, Of(source)) << name << "\n" << source;
+  }
 }
 
 // A body keeps its lines, and what stands behind it is not among them; a byte of a mark in a source is none.

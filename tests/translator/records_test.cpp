@@ -26,17 +26,6 @@ TEST_F(RecordsTest, NothingToRegister) {
   EXPECT_EQ("", TranslateHeader("$struct A { $int32 x; }; $type int8; $type+<<-register>> int16;").tail);
 }
 
-TEST_F(RecordsTest, TypeErrors) {
-  EXPECT_EQ("u.h(2) : error : @import of IObject.h required", ErrorOf("u.h", "\n$type int32;"));
-  AssertErrors({
-      {"$type\n1;", 2, "Type expected when read 1"},
-      {"$type+ std::string;", 1, "Unrecognised identifier : std"},
-      {"$type <<reflect>>\nxvector<int>;", 2, "Can't accept platform dependent type: int"},
-      {"$type <<register>> std::vector<int32>;", 1, "Unrecognised identifier : std"},
-      {"$type+ xvector<int8>\n x", 2, "; expected after $type vesk::xvector<vesk::int8> when read x"},
-  });
-}
-
 // Tails of headers go into the .cpp of the same stem, or else into the first that imports them directly.
 TEST_F(RecordsTest, PlacesOfTails) {
   Reflect("own.h", "Own");

@@ -83,15 +83,6 @@ class TranslateTest : public WorldTest {
     const std::string header = TranslateHeader(head + "\n{//\n" + body + "int end;\n};\n").header;
     return Section(header, "//\n", "int end;\n");
   }
-  void AssertHeader(const std::string& text, const std::string& header) {
-    ASSERT_EQ(header, TranslateHeader(text).header);
-  }
-  // Both texts with their tables on lines.
-  void AssertGenerated(const std::string& text, const std::string& header, const std::string& tail) {
-    const Generated generated = TranslateHeader(text);
-    ASSERT_EQ(header, Folded(generated.header));
-    ASSERT_EQ(tail, Folded(generated.tail));
-  }
 
   // What stands behind the first `begin`, up to the first `end` behind it; all the rest when `end` is empty.
   static std::string Section(const std::string& text, const std::string& begin, const std::string& end) {
@@ -125,10 +116,6 @@ class TranslateTest : public WorldTest {
     return result;
   }
 
-  // The tail of an element of the root name space; `record` is indented. `element`: as printed, "$enum+ E".
-  static std::string TailText(const std::string& element, const std::string& record) {
-    return "\n//### " + element + "\nnamespace vesk { XTarget* app_GetXTarget(); }\n" + record;
-  }
   // The printed form of the error that the translation of `text` raises.
   std::string ErrorOf(const std::string& name, const std::string& text) {
     try {
@@ -139,31 +126,21 @@ class TranslateTest : public WorldTest {
     }
   }
 
-  // Tables of header texts and the error that each raises, or the messages that its translation prints, in a new world
-  // for each, of the kind that `app` has. The import of IObject.h stands on the first line of the text. `before` and
-  // `after` stand around the text of each case.
-  struct ErrorCase {
-    std::string text;
-    int line;
-    std::string error;
-  };
-  struct MessageCase {
-    std::string text, message;
-  };
-  void AssertErrors(const std::vector<ErrorCase>& cases, const std::string& before = {},
-                    const std::string& after = {}) {
-    for (const auto& [text, line, error] : cases) {
-      SCOPED_TRACE(text);
-      EXPECT_EQ("t.h(" + ToString(line) + ") : error : " + error, ErrorInNewWorld("t.h", before + text + after));
-    }
+  // The error that a header raises, or the messages that its translation prints, in a new world of the kind that `app`
+  // has. The import of IObject.h stands on the first line of the text.
+  void AssertError(const std::string& text, int line, const std::string& error) {
+    EXPECT_EQ("t.h(" + ToString(line) + ") : error : " + error, ErrorInNewWorld("t.h", text)) << text;
   }
-  void AssertMessages(const std::vector<MessageCase>& cases, const std::string& name = "t.h") {
-    for (const auto& [text, message] : cases) {
-      SCOPED_TRACE(text);
-      const std::string error = ErrorInNewWorld(name, text);
-      EXPECT_EQ("no error", error.substr(0, 8)) << error;
-      EXPECT_EQ(message, Messages());
-    }
+  void AssertMessages(const std::string& text, const std::string& messages, const std::string& name = "t.h") {
+    const std::string error = ErrorInNewWorld(name, text);
+    EXPECT_EQ("no error", error.substr(0, 8)) << error;
+    EXPECT_EQ(messages, Messages()) << text;
+  }
+
+  // What is told of a header in a new world: its error, or else its messages.
+  std::string Told(const std::string& text) {
+    const std::string error = ErrorInNewWorld("t.h", text);
+    return !error.starts_with("no error") ? error : trace.empty() ? "" : Messages().substr(0, Messages().size() - 1);
   }
 
   std::string Messages() const { return WithShortPaths(trace); }  // all that was printed

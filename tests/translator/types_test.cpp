@@ -1,5 +1,6 @@
 // Types: their codes, their spellings, what they can do, all that may be wrong with them; and their byte code.
 
+#include "text_cases.h"
 #include "translator/emit/byte_code.h"
 #include "translator/emit/emit.h"
 #include "translator/file/keywords.h"
@@ -73,36 +74,8 @@ class TypesTest : public TranslateTest {
 };
 
 TEST_F(TypesTest, Codes) {
-  const std::pair<std::string, std::string> cases[] = {
-      {"int32", "04"},
-      {"xstring", "10"},
-      {"vesk::float64", "0d"},
-      {"const int8*", "35 31 02"},
-      {"int8 const* x", "35 31 02"},
-      {"int8* const", "31 35 02"},
-      {"typename K const& x", "36 31 20 01 4b"},
-      {"xvector<int32>", "44 04"},
-      {"vesk::xvector<vesk::int32>", "44 04"},
-      {"xmap<string8,xset<xvector<bool>>>", "51 10 47 44 01"},
-      {"xmap< xset<int8>, pref<n::I> > x", "51 47 02 42 21 04 6e 3a 3a 49"},
-      {"mvector<n::I>", "44 33 42 21 04 6e 3a 3a 49"},
-      {"assignable<ptr<n::I>>", "32 40 21 04 6e 3a 3a 49"},
-      {"offsettable<uint64>", "34 0a"},
-      {"xbag<xlist<xdeque<DynArray<cref<K>>>>>", "48 46 45 49 43 20 01 4b"},
-      {"openvariant<V>", "41 25 01 56"},
-      {"E", "23 01 45"},
-      {"F", "24 01 46"},
-      {"::n::T", "22 04 6e 3a 3a 54"},
-      {"vesk::IObject*", "35 21 0d 76 65 73 6b 3a 3a 49 4f 62 6a 65 63 74"},
-      {"int32 x[3][2*2]", "50 03 00 00 00 50 04 00 00 00 04"},
-      {"int32 x[65536*65536+3]", "50 03 00 00 00 04"},
-      {"K x[][256]", "49 50 00 01 00 00 20 01 4b"},
-      {"int32 : [7] x", "e1 a2 07 00 00 00 04"},
-      {"int32 : [true] * : [false] x", "e1 a1 00 35 e1 a1 01 04"},
-      {"int32 x : [\"s\"] [2] : [f(-1, g), 0.5]",
-       "e1 a4 01 73 e2 c2 01 66 a2 ff ff ff ff c0 01 67 a3 00 00 00 00 00 00 e0 3f 50 02 00 00 00 04"},
-  };
-  for (const auto& [text, code] : cases) EXPECT_EQ(code, Hex(CodeOf(text))) << text;
+  for (const auto& [name, text, code] : TextCasesOf("translator/type_codes.txt"))
+    EXPECT_EQ(code, Hex(CodeOf(text))) << text;
 }
 
 TEST_F(TypesTest, UnreflectedTypesStayText) {

@@ -3,6 +3,7 @@
 #include <fstream>
 
 #include "text/output_policy.h"
+#include "text_cases.h"
 #include "workspace/file_filter.h"
 #include "world_fixture.h"
 
@@ -282,50 +283,8 @@ TEST_F(ProjectTest, OptionsOfFiles) {
 }
 
 TEST_F(ProjectTest, Messages) {
-  for (const auto& [text, message] : std::initializer_list<std::pair<std::string, std::string>>{
-           {"", "(1) : Expected '$' when read EOS"},
-           {"$TARGET", "(1) : Expected 'TARGET_TYPE' when read TARGET"},
-           {"$TARGET_TYPE = 'x'", "(1) : Expected quoted string when read 'x'"},
-           {"$TARGET_TYPE \"x\"", "(1) : Expected = after TARGET_TYPE when read \"x\""},
-           {"$TARGET_TYPE = \"x\"\n$",
-            "(1) : Only target types \"Application\",\"Static Library\",\"Console Application\",\"Dynamic-Link "
-            "Library\",\"Utility Project\" supported"},
-           {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a\\\\b\"",
-            "(2) : Forward slashes must be used in \"a\\\\b\""},
-           {"$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"a/\"\n",
-            "(2) : Path can't end with a trailing slash : \"a/\""},
-       }) {
+  for (const auto& [name, text, message] : TextCasesOf("workspace/cases/project_messages.txt"))
     AssertError(text, message);
-  }
-  for (const auto& [text, message] : std::initializer_list<std::pair<const char*, const char*>>{
-           {"frob", "(3) : Expected { when read frob"},
-           {"config \"a|b\"", "(3) : Expected { when read \"a|b\""},
-           {"config { \"a\" }", "(3) : Config specifier \"a\" must be of the form name|platform"},
-           {"config { \"a|b|c\" }", "(3) : Config specifier \"a|b|c\" must be of the form name|platform"},
-           {"config {\n\"a|b\" [ x ] }", "(4) : Expected quoted string when read x"},
-           {"subproj { \"a\\\\b\" }", "(3) : Forward slashes must be used in \"a\\\\b\""},
-           {"{\n\"a\xFF\" }", "(4) : Path is not valid UTF-8 : \"a\xFF\""},
-           {"toolfiles {\n\"a\\\\b\" }", "(4) : Forward slashes must be used in \"a\\\\b\""},
-           {"prelinkevent { \"a\" \"b\" \"c\" }", "(3) : Expected } after \"b\" when read \"c\""},
-           {"general { Key = \"a\" }", "(3) : Invalid key Key"},
-           {"general { PlatformToolset = \"v143\" }", "(3) : Invalid key PlatformToolset"},
-           {"general { \"Key\" }", "(3) : Expected identifier when read \"Key\""},
-           {"general (\"a\" \"b\") { }", "(3) : Expected comma or right parenthesis when read \"b\""},
-           {"+ \"cpp\"", "(3) : Expected identifier when read \"cpp\""},
-           {"+asm { }", "(3) : Expected 'cpp' or 'link' when read asm"},
-           {"-asm { }", "(3) : Expected { when read -"},
-           {"-cpp {\n/frob\n}", "(4) : Invalid switch /frob"},
-           {"+link { -a", "(3) : Unexpected end of file"},
-           {"directories \"plain\"", "(3) : Expected '[', '+' or '-' when read \"plain\""},
-           {"{ \"a\\\\b\" }", "(3) : Forward slashes must be used in \"a\\\\b\""},
-           {"{ \"a\" : frob }", "(3) : Unknown option : frob"},
-           {"{ \"a\" : exclude, }", "(3) : Unknown option : }"},
-           {"{ \"../a\"\n\"../../up/a\" : exclude }", "(4) : Path leads out of the tree : ../up/a"},
-           {"{ \"../x\" {\n\"y/../../../a\" } }", "(4) : Path leads out of the tree : x/y/../../../a"},
-           {"qrex { \"/up/a\" }", "(3) : Path of a translated file must be relative : /up/a"},
-       }) {
-    AssertError(std::string(kHeads) + text, message);
-  }
   AssertError("$TARGET_TYPE = \"Library\"\n$ROOT_TO_PROJDIR = \"../app\" { }",
               "(2) : Path leads out of the tree : ../app");
 }

@@ -2,6 +2,7 @@
 // they come back as command lines.
 
 #include "message_of.h"
+#include "text_cases.h"
 #include "workspace/linker_text.h"
 #include "workspace/switch_blocks.h"
 #include "world_fixture.h"
@@ -74,47 +75,8 @@ class SwitchesTest : public WorldTest {
 
 TEST_F(SwitchesTest, WhatSwitchesSay) {
   settings.context.rootFrame.DefineSubstitution("DIR", "inc");
-  const std::string through = "PrecompiledHeaderThrough=", standard = "./$(CONFIG)/$(PROJNAME)/$(PROJNAME).h\n";
-  const std::pair<const char*, std::string> cases[] = {
-      {"", ""},
-      // flags
-      {"/GR /GL- /GS - /Gy /fp:except-",
-       "BufferSecurityCheck=false\nEnableFunctionLevelLinking=true\nFloatingPointExceptions=false\n"
-       "RuntimeTypeInfo=true\nWholeProgramOptimization=false\n"},
-      {"/nologo /Oi /X /C /GF /RTCc /Za /openmp /WX /u /FC /Zc:wchar_t /Zc:forScope /QRfpe",
-       "DisableLanguageExtensions=true\nEnableFloatingPointEmulation=true\nEnableIntrinsicFunctions=true\n"
-       "ForceConformanceInForLoopScope=true\nIgnoreStandardIncludePath=true\nKeepComments=true\nOpenMP=true\n"
-       "SmallerTypeCheck=true\nStringPooling=true\nSuppressStartupBanner=true\nTreatWChar_tAsBuiltInType=true\n"
-       "UndefineAllPreprocessorDefinitions=true\nUseFullPaths=true\nWarnAsError=true\n"},
-      {"/GR- /GR", "RuntimeTypeInfo=true\n"},
-      // enumerations
-      {"/Ox /Ob2 /Os /EHs /RTCsu /MDd /Zp16 /QRarch4t /TP /arch:AVX /fp:fast /FAs /FR /W0 /ZI /Gz /errorReport:send "
-       "/clr:oldSyntax",
-       "AssemblerOutput=4\nBasicRuntimeChecks=3\nBrowseInformation=1\nCallingConvention=2\nCompileAs=2\n"
-       "CompileForArchitecture=2\nDebugInformationFormat=4\nEnableEnhancedInstructionSet=?\nErrorReporting=?\n"
-       "ExceptionHandling=?\nFavorSizeOrSpeed=2\nFloatingPointModel=2\nInlineFunctionExpansion=2\n"
-       "ManagedExtensions=4\nOptimization=3\nRuntimeLibrary=3\nStructMemberAlignment=16\nWarningLevel=0\n"},
-      {"/clr", "ManagedExtensions=1\n"},
-      {"/arch:SSE /arch:SSE2", "EnableEnhancedInstructionSet=2\n"},
-      // arguments
-      {"/Fd\"d\" /Fe \"e\" /Fo'o' /Fp \"p\"",
-       "ObjectFile=o\nOutputFile=e\nPrecompiledHeaderFile=p\nProgramDataBaseFileName=d\n"},
-      {"/I \"a\" /D \"A=1\" /I\"b\" /FI \"f\" /FU \"g\" /U \"h\" /D \"A=1\"",
-       "AdditionalIncludeDirectories=a;b\nForcedIncludeFiles=f\nForcedUsingFiles=g\nPreprocessorDefinitions=A=1;A=1\n"
-       "UndefinePreprocessorDefinitions=h\n"},
-      {"/MP4 /Zm200 /FD /bigobj", "AdditionalOptions=/MP4 /Zm200 /FD /bigobj\n"},
-      {"/wd 4100 /wd 0044", "DisableSpecificWarnings=4100;44\n"},
-      {"/I \"$(DIR)/x\"", "AdditionalIncludeDirectories=inc/x\n"},
-      // precompiled headers
-      {"/Yc", through + standard + "UsePrecompiledHeader=1\n"},
-      {"/Yu\"all.h\"", through + "all.h\nUsePrecompiledHeader=2\n"},
-      {"/YX /Yu \"\"", through + "\nUsePrecompiledHeader=2\n"},
-      {"/YX", through + standard + "UsePrecompiledHeader=0\n"},
-      // deprecated ones count as far as they are known
-      {"/GX /GZ /Fr /clr:noAssembly",
-       "BasicRuntimeChecks=3\nBrowseInformation=2\nExceptionHandling=1\nManagedExtensions=3\n"},
-  };
-  for (const auto& [switches, expected] : cases) AssertRead(kAddCpp, switches, expected);
+  for (const auto& [name, switches, expected] : TextCasesOf("workspace/cases/switches.txt"))
+    AssertRead(kAddCpp, switches, expected);
   AssertRead(kRemoveCpp, "/Yu \"all.h\"", "UsePrecompiledHeader=2\n");
   ASSERT_EQ(
       "warning: Compiler switch /GX is deprecated\nwarning: Compiler switch /GZ is deprecated\n"

@@ -60,3 +60,43 @@ template<> struct TypeTraits<G> {
 };
 } // namespace vesk
 ;
+// A tab counts 4; a shallower line loses its blanks alone.
+void use() {
+    struct f_delegator {
+    static bool __stdcall static_delegate(void* _self,vesk::int32 a,vesk::string8 const& b) {
+        if (a)
+            return 1;
+        return 2;
+    }
+};
+
+F f(NULL,f_delegator::static_delegate);
+    f(1, "");
+}
+struct g_delegator {
+    static void __stdcall static_delegate(void* _self) {
+        go();
+    }
+};
+
+G g(NULL,g_delegator::static_delegate);
+struct bound_delegator : public Base<int, char> {
+    bool member_delegate(vesk::int32 a,vesk::string8 const& b) {
+        return a + m_n;
+    }
+    static bool __stdcall static_delegate(void* _self,vesk::int32 a,vesk::string8 const& b) {
+        return static_cast<bound_delegator*>(_self)->member_delegate(a,b);
+    }
+};
+
+F bound(find(x, y),bound_delegator::static_delegate);;
+struct constant_delegator : public Base {
+    void member_delegate() const {
+        go();
+    }
+    static void __stdcall static_delegate(void* _self) {
+        static_cast<constant_delegator*>(_self)->member_delegate();
+    }
+};
+
+G constant(const_cast<Base*>(this),constant_delegator::static_delegate);

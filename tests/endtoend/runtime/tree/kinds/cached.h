@@ -1,4 +1,5 @@
-// Cached functions of every form in a mixin and in a class template: what their nodes inherit depends on parameters.
+// Cached functions of every form, for a class, a mixin and a class template: what their nodes inherit may depend on
+// parameters.
 @import "Vesk/vxObject/IObject.h"
 @import "shapes/shapes.h"
 
@@ -6,31 +7,8 @@ $warning(disable: 1009)
 
 namespace kinds {
 
-$mixin CacheMixin {
-    $indep int32 source;
-    $cache int32 tens() const { ++calculated; return source / 10; }
-    $cache ^ <<queue(2)>> void filled(vesk::xvector<int32>& out) const { out.assign(3, source); }
-    $cache int32 plus(int32 a) const { ++calculated; return source + a; }
-    $cache ^ int32 sum(int32 a, const vesk::string8& b, int32 c = 1) const { return source + a + int32(b.size()) + c; }
-    $cache void keyed(vesk::string8& out, int32 n) const { out = vesk::string8(n, 'x'); }
-    $cache <<async>> int32 later() const { return source + 1; }
-    $cache <<async io>> void laterInto(int32& out) const with int32 in = { in = source; }; { out = in * 2; }
-    $cache <<async queue(1)>> int32 laterKeyed(int32 k) const
-        with vesk::xvector<int32> in { in.push_back(source); in.push_back(k); }
-    {
-        return in[0] + in[1];
-    }
-    $cache <<async>> void laterPlain(int32& out, int32 k, int32 m) const { out = k * m; }
-    mutable int32 calculated = 0;
-};
-$class+ WithCaches isa shapes::INamed : mixin [ CacheMixin ] {
-public:
-    vesk::string8 Name() const { return "caches"; }
-    $int32 base;
-};
-
-$struct CacheTemplate<typename T> {
-    $indep T source;
+@def EveryCachedFunction(T) =
+{
     $cache T tens() const { ++calculated; return source / 10; }
     $cache ^ <<queue(2)>> void filled(vesk::xvector<T>& out) const { out.assign(3, source); }
     $cache T plus(T a) const { ++calculated; return source + a; }
@@ -45,6 +23,21 @@ $struct CacheTemplate<typename T> {
     }
     $cache <<async>> void laterPlain(T& out, T k, T m) const { out = k * m; }
     mutable int32 calculated = 0;
+}
+
+$mixin CacheMixin {
+    $indep int32 source;
+    EveryCachedFunction(int32)
+};
+$class+ WithCaches isa shapes::INamed : mixin [ CacheMixin ] {
+public:
+    vesk::string8 Name() const { return "caches"; }
+    $int32 base;
+};
+
+$struct CacheTemplate<typename T> {
+    $indep T source;
+    EveryCachedFunction(T)
 };
 
 }

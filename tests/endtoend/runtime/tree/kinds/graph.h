@@ -1,6 +1,7 @@
-// Dependency nodes with every section, in classes and mixins; cached functions, plain and keyed, sync and async.
+// Dependency nodes with every section, in classes and mixins.
 @import "Vesk/vxObject/IObject.h"
 @import "kinds/models.h"
+@import "kinds/cached.h"
 
 $warning(disable: 1009)
 
@@ -36,24 +37,12 @@ public:
     $dep int32 backAgain = { backAgain = cyclic + 1; };
     $dep int32 total = { total = 0; for (int i = 0; i < items.read().size(); ++i) total += items[i]; };
 
-    $cache int32 tens() const { ++calculated; return source / 10; }
-    $cache ^ <<queue(2)>> void filled(vesk::xvector<int32>& out) const { out.assign(3, source); }
-    $cache int32 plus(int32 a) const { ++calculated; return source + a; }
-    $cache int32 sum(int32 a, const vesk::string8& b, int32 c = 1) const { return source + a + int32(b.size()) + c; }
-    $cache void keyed(vesk::string8& out, int32 n) const { out = vesk::string8(n, 'x'); }
-    $cache <<async>> int32 later() const { return source + 1; }
-    $cache <<async io>> void laterInto(int32& out) const with int32 in = { in = source; }; { out = in * 2; }
-    $cache <<async queue(1)>> int32 laterKeyed(int32 k) const
-        with vesk::xvector<int32> in { in.push_back(source); in.push_back(k); }
-    {
-        return in[0] + in[1];
-    }
-    $cache <<async>> void laterPlain(int32& out, int32 k, int32 m) const { out = k * m; }
+    EveryCachedFunction(int32)
 
     $evict { ++evicted; }
     $visit { v << seen; }
     static int32 Hundred() { return 100; }
-    mutable int32 evicted = 0, calculated = 0, invalidated = 0, effects = 0;
+    mutable int32 evicted = 0, invalidated = 0, effects = 0;
     vesk::ptr<shapes::INamed> seen;
 };
 

@@ -32,22 +32,38 @@ inline int RunRows() {
     return g_failures > 0;
 }
 
-template <typename Action>
-bool Throws(Action action) {
+// What the action answers, or the error that comes of it says.
+template <typename Error = std::exception, typename Action>
+vesk::xstring Outcome(Action action) {
     try {
-        action();
-    } catch (std::exception const&) {
-        return true;
+        return action();
+    } catch (Error const& error) {
+        return error.what();
     }
-    return false;
+}
+template <typename Error = std::exception, typename Action>
+vesk::xstring ErrorOf(Action action) { return Outcome<Error>([&] { return action(), "none"; }); }
+template <typename Action>
+bool Throws(Action action) { return ErrorOf(action) != "none"; }
+
+typedef vesk::xvector<vesk::octet_t> Bytes;
+
+template <typename... T>
+Bytes Written(T const&... values) {
+    vesk::Archive ar;
+    (void)(ar << ... << values);
+    return ar.m_bytes;
+}
+
+inline Bytes Joined(Bytes a, Bytes const& b) {
+    a.insert(a.end(), b.begin(), b.end());
+    return a;
 }
 
 // Through an archive.
 template <typename T>
 void Copy(T const& from, T& to) {
-    vesk::Archive ar;
-    ar << from;
-    vesk::InputArchive input(ar);
+    vesk::InputArchive input(Written(from));
     input >> to;
 }
 

@@ -28,20 +28,6 @@ $class+ Album isa kinds::IDoc : model {
 
 namespace {
 
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-template <typename T>
-Bytes Written(T const& value) {
-    vesk::Archive ar;
-    ar << value;
-    return ar.m_bytes;
-}
-
-Bytes Joined(Bytes a, Bytes const& b) {
-    a.insert(a.end(), b.begin(), b.end());
-    return a;
-}
-
 // The parts that are no groups, with their paths and values.
 vesk::xstring Brief(vesk::ArchiveView const& view) {
     return vesk::TextOf([&](vesk::xostream& os) {
@@ -94,8 +80,7 @@ ROW(Dumps) {
           "  #1.colour: not written -> Green\n"
           "  #1.level: not written -> High\n");
     vesk::ArchiveView view(g_oldOfKinds);
-    CHECK(view.Today().Text(), "Size(20,7,Green,High)");
-    CHECK(view.Releases()[0].m_current, 3);
+    CHECK(vxMakeString(view.Today().Text() << view.Releases()[0].m_current), "Size(20,7,Green,High)3");
     CHECK(vesk::DumpArchiveOf<vesk::xvector<vesk::string8>>({1, 9, 'n', 'i', 'n', 'e', ' ', 'b', 'y', 't', 'e'}),
           "xvector<string8>, 11 bytes\n"
           "offset    bytes                     path                        type                value\n"
@@ -184,8 +169,8 @@ ROW(DumpedParts) {
     numbers[999] = 5;
     const Bytes bytes = Written(numbers);
     vesk::ArchiveView view = vesk::ArchiveView::Of<vesk::xvector<int32>>(bytes);
-    CHECK(view.CountParts(), 502);
-    CHECK(vxMakeString(view.Parts(501)[0].m_path << view.Parts(501)[0].m_value << view.Parts(500, 9).size()), "[998..999]0 52");
+    const vesk::ArchivePart last = view.Parts(501)[0];
+    CHECK(vxMakeString(view.CountParts() << last.m_path << last.m_value << view.Parts(500, 9).size()), "502[998..999]0 52");
     vesk::xvector<vesk::string8> words(10, "word");
     vesk::ArchiveOptions options;
     options.m_parts = 5;

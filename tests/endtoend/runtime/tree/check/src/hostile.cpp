@@ -7,24 +7,12 @@ using namespace kinds;
 
 namespace {
 
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-template <typename... T>
-Bytes Written(T const&... values) {
-    vesk::Archive ar;
-    (ar << ... << values);
-    return ar.m_bytes;
-}
-
 template <typename T>
 bool Refuses(Bytes bytes, T& value, vesk::ArchiveLimits const& limits = {}) {
-    try {
+    return ErrorOf<vesk::ArchiveError>([&] {
         vesk::InputArchive input(std::move(bytes), limits);
         input >> value;
-    } catch (vesk::ArchiveError const&) {
-        return true;
-    }
-    return false;
+    }) != "none";
 }
 
 template <typename T>
@@ -58,8 +46,7 @@ ROW(HostileReferences) {
     vesk::SerialiseVariableLengthUint(ar, 1);
     vesk::InputArchive input(ar);
     OfTwo two;
-    CHECK(Throws([&] { input >> two; }), true);
-    CHECK(two.second.Get() == nullptr, true);
+    CHECK(Throws([&] { input >> two; }) && two.second.Get() == nullptr, true);
     delete two.first.Get();
 
     // A Doc, then its number where a reference to a Size or to an object of another interface stands.
@@ -77,11 +64,8 @@ ROW(HostileReferences) {
         first->DestroyObject();
         return throws;
     };
-    CHECK(second(vesk::pref<IDoc>()), false);
-    CHECK(second(vesk::cref<Doc>()), false);
-    CHECK(second(vesk::cref<Size>()), true);
-    CHECK(second(vesk::cref<Sized>()), true);
-    CHECK(second(vesk::pref<shapes::INamed>()), true);
+    CHECK(second(vesk::pref<IDoc>()) || second(vesk::cref<Doc>()), false);
+    CHECK(second(vesk::cref<Size>()) && second(vesk::cref<Sized>()) && second(vesk::pref<shapes::INamed>()), true);
 
     // The other way round: a value behind a cref is no object.
     Size size(3);
@@ -143,15 +127,13 @@ void TryVariant(V const& written) {
     vesk::Archive ar;
     vesk::SerialiseVariableLengthUint(ar, 70000u);
     V read = vesk::string8("text");
-    CHECK(Refuses(ar.m_bytes, read), true);
-    CHECK(read, "text");
+    CHECK(vxMakeString(Refuses(ar.m_bytes, read) << read), "truetext");
 }
 
 ROW(HostileVariants) {
     for (Value const& value : {Value(Value::point(1, 2)), Value(Value::list({1, 2, 3})), Value(Size(3))}) TryVariant(value);
     TryVariant<Small>(vesk::string8("some text"));
-    CHECK(Refuses<Nothing>({2}), true);
-    CHECK(Refuses<Nothing>({1}), false);
+    CHECK(Refuses<Nothing>({2}) && !Refuses<Nothing>({1}), true);
 
     // The member on its own: what it destroyed is not destroyed again.
     Value value = vesk::string8("a text that is long enough to stand on the heap");
@@ -177,18 +159,13 @@ ROW(HostileVariants) {
         if (leaf == 2) keys.insert(keys.end(), 4, 0);
     }
     vesk::xset<Tree> set;
-    CHECK(Refuses(keys, set), false);
-    CHECK(set.size(), 2);
+    CHECK(vxMakeString(Refuses(keys, set) << set.size()), "false2");
 }
 
 ROW(HostileNumbers) {
-    CHECK(Refuses<bool>({2}), true);
-    CHECK(Refuses<bool>({1}), false);
-    CHECK(Refuses<vesk::xvector<bool>>({2, 1, 255}), true);
-    CHECK(Refuses<vesk::DynArray<bool>>({2, 1, 255}), true);
-    CHECK(Refuses<shapes::Colour>({3}), true);
-    CHECK(Refuses<shapes::Level>({3}), true);
-    CHECK(Refuses<shapes::Refined>({2}), true);
+    CHECK(Refuses<bool>({2}) && !Refuses<bool>({1}), true);
+    CHECK(Refuses<vesk::xvector<bool>>({2, 1, 255}) && Refuses<vesk::DynArray<bool>>({2, 1, 255}), true);
+    CHECK(Refuses<shapes::Colour>({3}) && Refuses<shapes::Level>({3}) && Refuses<shapes::Refined>({2}), true);
     for (int number : {0, 5, 6}) CHECK(Refuses<shapes::Colour>({vesk::octet_t(number)}), false);
     for (int number : {0, 1, 7, 8}) CHECK(Refuses<shapes::Refined>({vesk::octet_t(number)}), false);
     CHECK(Refuses<shapes::Empty>({0}), false);
@@ -201,14 +178,10 @@ ROW(HostileNumbers) {
 }
 
 ROW(HostileSizes) {
-    CHECK(Refuses<vesk::string8>(g_billions), true);
-    CHECK(Refuses<vesk::string16>({2, 0, 0, 0}), true);
-    CHECK(Refuses<vesk::xvector<None>>(g_billions), true);
-    CHECK(Refuses<vesk::xlist<None>>(g_billions), true);
-    CHECK(Refuses<vesk::DynArray<Everything>>(g_billions), true);
-    CHECK(Refuses<vesk::DynArray<int32>>({2, 0, 0, 0, 0, 0, 0, 0}), true);
-    CHECK((Refuses<vesk::xmap<int32, int32>>(g_billions)), true);
-    CHECK(Refuses<vesk::xset<vesk::string8>>(g_billions), true);
+    CHECK(Refuses<vesk::string8>(g_billions) && Refuses<vesk::string16>({2, 0, 0, 0}), true);
+    CHECK(Refuses<vesk::xvector<None>>(g_billions) && Refuses<vesk::xlist<None>>(g_billions), true);
+    CHECK(Refuses<vesk::DynArray<Everything>>(g_billions) && Refuses<vesk::DynArray<int32>>({2, 0, 0, 0, 0, 0, 0, 0}), true);
+    CHECK((Refuses<vesk::xmap<int32, int32>>(g_billions) && Refuses<vesk::xset<vesk::string8>>(g_billions)), true);
     CHECK((Refuses<vesk::Array<int32, 3>>({2, 0, 0, 0, 0, 0, 0, 0, 0})), true);
 
     Everything all;
@@ -233,15 +206,12 @@ ROW(Limits) {
     limits.m_objects = 1;
     limits.m_emptyElements = 2;
     vesk::xvector<None> empty;
-    CHECK(Refuses({2}, empty, limits) || Refuses({3, 0}, empty), false);
-    CHECK(Refuses({3}, empty, limits), true);
+    CHECK(Refuses({3}, empty, limits) && !Refuses({2}, empty, limits) && !Refuses({3, 0}, empty), true);
     Tree tree;
-    CHECK(Refuses({1, 1, 1, 1, 0}, tree, limits), false);
-    CHECK(Refuses({1, 1, 1, 1, 1, 1, 0}, tree, limits), true);
-    CHECK(Refuses({1, 1, 1, 1, 1, 1, 0}, tree), false);
+    const Bytes deep = {1, 1, 1, 1, 1, 1, 0};
+    CHECK(Refuses(deep, tree, limits) && !Refuses({1, 1, 1, 1, 0}, tree, limits) && !Refuses(deep, tree), true);
     vesk::xvector<int32> numbers;
-    CHECK(Refuses({1, 0, 0, 0, 0}, numbers, limits), false);
-    CHECK(Refuses({2, 0, 0, 0, 0, 0, 0, 0, 0}, numbers, limits), true);
+    CHECK(Refuses({2, 0, 0, 0, 0, 0, 0, 0, 0}, numbers, limits) && !Refuses({1, 0, 0, 0, 0}, numbers, limits), true);
     vesk::xvector<vesk::cref<vesk::int8>> references;
     CHECK(Refuses({2, 1, 7, 2, 8}, references, limits), true);
     delete references[0].Get();

@@ -14,18 +14,6 @@ using namespace kinds;
 
 namespace {
 
-typedef vesk::xvector<vesk::octet_t> Bytes;
-
-template <typename Action>
-vesk::xstring ErrorOf(Action action) {
-    try {
-        action();
-    } catch (std::exception const& error) {
-        return error.what();
-    }
-    return "none";
-}
-
 // Longer than what a string holds within itself.
 vesk::string8 Word(int n) { return vxMakeString("a word with the number " << n); }
 
@@ -67,8 +55,7 @@ void CheckOwnFields() {
     CHECK(own.text.read(), text);
 
     own.names.Insert(Word(1));
-    CHECK(own.names.Insert(*own.names.read().begin()), false);
-    CHECK(own.names.Delete(*own.names.read().begin()), true);
+    CHECK(!own.names.Insert(*own.names.read().begin()) && own.names.Delete(*own.names.read().begin()), true);
     own.map["a"] = Word(1);
     own.map["b"] = own.map.read()["a"];
     CHECK(own.map.read()["b"], Word(1));
@@ -159,11 +146,9 @@ ROW(OwnParts) {
     // Half an array leaves nothing behind.
     alignas(Counted) char room[8 * sizeof(Counted)];
     Counted* const made = reinterpret_cast<Counted*>(room);
-    CHECK(Throws([&] { vesk::ConstructArray(made, 0, 8); }), true);
-    CHECK(Counted::s_count, 0);
+    CHECK(Throws([&] { vesk::ConstructArray(made, 0, 8); }) && Counted::s_count == 0, true);
     vesk::ConstructArray(made, 0, 2);
-    CHECK(Throws([&] { vesk::CopyConstructArray(made, 2, made, 0, 2); }), true);
-    CHECK(Counted::s_count, 2);
+    CHECK(Throws([&] { vesk::CopyConstructArray(made, 2, made, 0, 2); }) && Counted::s_count == 2, true);
     vesk::DestructArray(made, 0, 2);
 }
 

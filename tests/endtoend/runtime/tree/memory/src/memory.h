@@ -46,5 +46,3 @@ struct Scenario {
 };
 
 vesk::xvector<Scenario> GraphScenarios();
-vesk::xvector<Scenario> ContainerScenarios();
-vesk::xvector<Scenario> ValueScenarios();
