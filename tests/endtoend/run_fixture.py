@@ -42,7 +42,6 @@ FILES = {
 }
 DEPENDENCIES = 'qrexsource/x64/Debug/app.qrexdep'
 TRANSLATED = 'qrexsource/x64/Debug/app/'
-MAGIC = 0x2AEF78F1
 EACH_RUN = {DEPENDENCIES, 'projects.guids'}  # written by every run
 JUNK = bytes(range(256)) * 8
 

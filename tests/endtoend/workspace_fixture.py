@@ -33,6 +33,34 @@ CACHE = "/usr/lib/ccache"
 if os.path.isdir(CACHE):
     os.environ.update(PATH=f"{CACHE}:{os.environ['PATH']}", CCACHE_BASEDIR=tempfile.gettempdir(), CCACHE_NOHASHDIR="1")
 
+
+def project(kind, root, files, statements=""):
+    """The text of a project that is translated, with one configuration."""
+    return f'$TARGET_TYPE = "{kind}"\n$ROOT_TO_PROJDIR = "{root}"\nconfig {{ "Debug|x64" }}\n{statements}\nqrex\n{{ {files} }}\n'
+
+
+def workspace_of(*names, settings=""):
+    """The files of a workspace of these projects but for their own."""
+    listed = " ".join(f'"{name}"' for name in names)
+    return {"all.qrex": SETTINGS + settings, "tree/.qrwsroot": "", "tree/all.qrws": f'"all" {{ {listed} }}\n'}
+
+
+def stand_ins(ahead="", linking=""):
+    """Tools of the gcc family: an object is its source, a library or program what went into it. What runs ahead of a compilation
+    has $object and $source, what runs ahead of a link $target."""
+    return {"tools/gcc-4": f"""#!/bin/bash
+text=$(tr -d '\\r' < "${{2#@}}"); object=${{text#*-o \\"}}; object=${{object%%\\"*}}; source=${{text##* \\"}}; source=${{source%\\"*}}
+{ahead}
+cat "$source" > "$object"
+""", "tools/ar": """#!/bin/sh
+cat $(tr -d '"\\r' < "${3#@}") > "$2"
+""", "tools/g++": f"""#!/bin/sh
+text=$(tr -d '"\\r' < "${{1#@}}"); set -- $text; target=$2; shift 2
+{linking}
+{{ echo "$text"; for word; do [ ! -f "$word" ] || cat "$word"; done; }} > "$target"
+"""}
+
+
 # The words of `compiler`, in their order.
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 
