@@ -1,11 +1,10 @@
 #!/usr/bin/env python3
 """Hints: what a terminal shows behind a message, on a line of its own, and a pipe or a file does not."""
 
-import re
 import subprocess
 
 from terminal_fixture import on_terminal
-from workspace_fixture import COMPILERS, SETTINGS, Workspace, equal, holds, in_workspace, lacks, need, run_tests
+from workspace_fixture import COMPILERS, SETTINGS, Workspace, comparable, equal, holds, in_workspace, lacks, need, run_tests
 
 PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n%s\n{\n    "src"\n    {\n        %s\n    }\n}\n'
 FILES = {
@@ -22,29 +21,20 @@ FILES = {
 HERE = " (relative paths begin in the folder where Qrex runs)"
 
 
-def comparable(text, folder):
-    """Without what differs from run to run."""
-    return re.sub(r"\.+ +[0-9.]+ ms$", "", text.replace(str(folder), "FOLDER"), flags=re.MULTILINE)
-
-
 def hints_of(binary, changes, *arguments):
-    """The hints of a run on a terminal. Its other lines are all that a pipe and a file get."""
-    def run(how):
-        files = {name: text for name, text in {**FILES, **changes}.items() if text is not None}
+    """The hints of a run on a terminal. Its other lines are all that a pipe gets."""
+    files = {name: text for name, text in {**FILES, **changes}.items() if text is not None}
+    command, outputs = [binary, "main.qrex", *arguments], []
+    for terminal in (True, False):
         with Workspace(binary, files) as workspace:
-            command = [binary, "main.qrex", *arguments]
-            if how == "terminal":
-                return comparable(on_terminal(command, workspace.folder, TERM="dumb")[0], workspace.folder)
-            with open(workspace.path("output"), "wb") as file:
-                target = subprocess.PIPE if how == "pipe" else file
-                done = subprocess.run(command, cwd=workspace.folder, stdout=target, stderr=subprocess.STDOUT, timeout=60)
-            output = done.stdout if how == "pipe" else workspace.path("output").read_bytes()
-            return comparable(output.decode(), workspace.folder)
-    lines = run("terminal").splitlines(keepends=True)
-    plain = "".join(line for line in lines if not line.startswith("    hint: "))
-    for how in ("pipe", "file"):
-        equal(run(how), plain)
-    return [line.removeprefix("    hint: ").rstrip("\n") for line in lines if line.startswith("    hint: ")]
+            if terminal:
+                output = on_terminal(command, workspace.folder, TERM="dumb")[0]
+            else:
+                output = subprocess.run(command, cwd=workspace.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, text=True).stdout
+            outputs.append(output.replace(str(workspace.folder), "FOLDER"))
+    lacks(outputs[1], "hint: ")
+    equal(*map(comparable, outputs))
+    return [line.removeprefix("    hint: ") for line in outputs[0].splitlines() if line.startswith("    hint: ")]
 
 
 LEFT_OUT = "the run ends here and leaves out: "

@@ -10,32 +10,23 @@ import time
 from pathlib import Path
 
 from browser_fixture import Browser, with_selenium
-from workspace_fixture import ROOT, SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import ROOT, comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 with_selenium()
 
 # Takes as long as the source says, and prints a warning or an error where it says so.
-COMPILER = r"""#!/bin/bash
-rsp=${2#@}; read -r text < "$rsp"
-object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
-seconds=$(sed -n 's/.*slow \([0-9.]*\).*/\1/p' "$source"); sleep "${seconds:-0}"
+COMPILING = r"""seconds=$(sed -n 's/.*slow \([0-9.]*\).*/\1/p' "$source"); sleep "${seconds:-0}"
 grep -n warned "$source" | sed "s|^\([0-9]*\):.*|$source:\1:5: warning: odd <b>bold</b>|" >&2
 if grep -q wrong "$source"; then echo "$source:1:5: error: bad" >&2; exit 1; fi
-if grep -q mute "$source"; then exit 3; fi
-cp "$source" "$object"
-"""
-ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
-LINKER = '#!/bin/sh\nsleep 0.1; : > out/lib/x64/Debug/app\n'
-PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n%s{ %s "src" { %s } }\n'
+if grep -q mute "$source"; then exit 3; fi"""
+CORE = project("Static Library", "core", '"c.h" "src" { "one.cpp" "two.cpp" "core.cpp" }')
 FILES = {
-    "all.qrex": SETTINGS + "jobs = 2\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "core" "app" }\n',
-    "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER, "tools/g++": LINKER,
-    "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "", '"c.h"', '"one.cpp" "two.cpp" "core.cpp"'),
+    **workspace_of("core", "app", settings="jobs = 2\n"), **stand_ins(COMPILING, "sleep 0.1"), "tree/core/src/core.qrpj": CORE,
     "tree/core/c.h": "$enum+ E { e1 };\n",
     "tree/core/src/one.cpp": '@import "core/c.h"\nint one;  // slow 0.3\n',
     "tree/core/src/two.cpp": '@import "core/c.h"\nint two;  // slow 0.2, warned\n',
     "tree/core/src/core.cpp": "int core;\n",
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" }\n', "", '"app.cpp"'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }', 'subproj { "core" }'),
     "tree/app/src/app.cpp": '@import "core/c.h"\nint main() {}\n',
 }
 TRACE, REPORT = 'buildTrace="out/trace.json"', 'report="out/report.html"'
@@ -126,10 +117,8 @@ def shown_steps(browser):
 
 
 def hostile_files():
-    project = "tree/core/src/core.qrpj"
-    changed = {project: FILES[project].replace('"core.cpp"', '"core.cpp" "<" { "script><b>.cpp" }'),
-               f"tree/{HOSTILE}": '@import "core/c.h"\nint hostile;  // warned\n', "tree/core/src/core.cpp": "int core;\nwrong\n"}
-    return {**FILES, **changed}
+    return {**FILES, "tree/core/src/core.qrpj": CORE.replace('"core.cpp"', '"core.cpp" "<" { "script><b>.cpp" }'),
+            f"tree/{HOSTILE}": '@import "core/c.h"\nint hostile;  // warned\n', "tree/core/src/core.cpp": "int core;\nwrong\n"}
 
 
 @in_workspace(hostile_files)
@@ -236,10 +225,9 @@ $model+ Note
 $class+ Page isa IShape : model Note { };
 '''
 DECLARING = {
-    "all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n',
-    "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n',
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "Vesk/vxObject" }\n', '"a.h" "b.h" "<" { "b>.h" }',
-                                        '"app.cpp" ' + " ".join(f'"m{i}.cpp"' for i in range(20))),
+    **workspace_of("app", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"a.h" "b.h" "<" { "b>.h" } "src" { "app.cpp" "m*.cpp" }',
+                                     'subproj { "Vesk/vxObject" }'),
     "tree/app/a.h": '@import "app/</b>.h"\n' + MODELS, "tree/app/b.h": '@import "app/a.h"\n$struct Held { $Point at; };\n',
     "tree/app/</b>.h": "inline int b() { return 0; }\n", "tree/app/src/app.cpp": '@import "app/b.h"\nint main() { return 0; }\n',
     **{f"tree/app/src/m{i}.cpp": '@import "app/</b>.h"\n' for i in range(20)},
