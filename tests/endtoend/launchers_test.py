@@ -8,23 +8,14 @@ import socket
 import subprocess
 import time
 
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import Workspace, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 COUNT = 8
-PROJECT = """$TARGET_TYPE = "Console Application"
-$ROOT_TO_PROJDIR = "app"
-config { "Debug|x64" }
-+cpp("Debug|x64") { -MMD %s }
-qrex
-{ "src" { "app.h" %s } }
-"""
-
-
-def files(switches="'-DNAME=\"two words\"'"):
+def files():
     sources = ["app.cpp"] + [f"part{number}.cpp" for number in range(1, COUNT)]
-    made = {"all.qrex": SETTINGS + "writeTokenEquivalent = false\n",
-            "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n',
-            "tree/app/src/app.qrpj": PROJECT % (switches, " ".join(f'"{source}"' for source in sources)),
+    listed = " ".join(f'"{source}"' for source in sources)
+    made = {**workspace_of("app", settings="writeTokenEquivalent = false\n"),
+            "tree/app/src/app.qrpj": project("Console Application", "app", f'"src" {{ "app.h" {listed} }}', "+cpp { -MMD '-DNAME=\"two words\"' }"),
             "tree/app/src/app.h": "inline const char* name() { return NAME; }\n",
             "tree/app/src/app.cpp": '@import "app.h"\n#include <cstdio>\nint main() { std::puts(name()); }\n'}
     made.update({f"tree/app/src/part{number}.cpp": f'int part{number}() {{ return {number}; }}\n'
