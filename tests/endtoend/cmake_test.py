@@ -7,7 +7,7 @@ import shutil
 import subprocess
 from pathlib import Path
 
-from workspace_fixture import ROOT, Workspace, equal, holds, lacks, need, run_tests
+from workspace_fixture import ROOT, Workspace, equal, holds, indented, install, lacks, need, run_tests
 
 PAGE = (ROOT / "docs/cmake.md").read_text()
 TOLD = 'goods::Item\n    string8 name = rope\n    [unit("m")] float64 length = 12.5\n    costs 10\n'
@@ -19,8 +19,7 @@ os.environ.pop("CMAKE_CXX_COMPILER_LAUNCHER", None)
 def blocks(heading):
     """The indented blocks of a section."""
     section = re.search(rf"^## {heading}\n(.*?)(?=^## |\Z)", PAGE, re.S | re.M).group(1)
-    texts = re.findall(r"(?<=\n\n)((?:    .*\n|\n(?=    ))+)", section)
-    return [re.sub(r"^    ", "", text, flags=re.M) for text in texts]
+    return [block for _, block in indented(section)]
 
 
 class Build(Workspace):
@@ -30,9 +29,7 @@ class Build(Workspace):
         super().__init__(binary, {})
         self.prefix = self.path(prefix)
         self.example = self.path("stock")
-        for component in ("tool", "runtime"):
-            subprocess.run(["cmake", "--install", os.path.dirname(binary), "--prefix", self.prefix, "--component", component],
-                           check=True, stdout=subprocess.DEVNULL)
+        install(binary, self.prefix)
         shutil.copytree(ROOT / "examples/cmake", self.example, ignore=shutil.ignore_patterns("build", "out", "qrexsource", "x64"))
 
     def shell(self, command, status=0, **environment):
@@ -240,12 +237,6 @@ def test_plain_make(build):
     lacks(output, "-o main.cpp.o")
     build.edit("tree/goods/api/item.h", '"m"', '"cm"')
     holds(build.shell("make -j8 && ./stock && make"), '[unit("cm")]', "'stock' is up to date")
-    build.write("stock/tree/goods/api/box.h", NEW_HEADER)
-    build.write("stock/tree/goods/src/box.cpp", '@import "api/box.h"\n')
-    holds(build.shell("make"), "-o box.cpp.o")
-    os.remove(build.example / "tree/goods/src/box.cpp")
-    os.remove(build.example / "tree/goods/api/box.h")
-    lacks(build.shell("make && ./stock"), "box.cpp")
 
 
 run_tests(globals())

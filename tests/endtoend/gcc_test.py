@@ -27,16 +27,6 @@ def test_builds_libraries_and_a_program_and_only_what_is_stale(workspace):
 
 
 @in_workspace(FILES, "g++")
-def test_a_built_tree_moves_and_two_checkouts_are_equal(workspace):
-    workspace.shell("mkdir -p one 'another one/b' && cp -r all.qrex tree one && cp -r all.qrex tree 'another one/b'")
-    for folder in ("one", "another one/b"):
-        holds(workspace.shell(f"cd '{folder}' && Qrex all.qrex"), "\nCompleted....")
-    workspace.shell("diff -r one/out/lib 'another one/b/out/lib'")
-    workspace.shell("mv one/out/lib/x64/Debug moved && rm -r one")
-    equal(workspace.shell("moved/app"), RESULT)
-
-
-@in_workspace(FILES, "g++")
 def test_messages_point_at_the_source(workspace):
     workspace.append("tree/lib/lib.h", "inline int Broken()\n{\n    return nowhere;\n}\n")
     workspace.append("tree/app/src/the kind.cpp", "static int unused;\n")

@@ -73,7 +73,6 @@ CASES = [
     ({"tree/all.qrws": '"all" { "deep/other.qrws" }'}, [], ["not found as tree/deep/other.qrws, more/deep/other.qrws" + HERE]),
     ({"tree/all.qrws": '"all" { "cor" }'}, [], ["not found as tree/cor/src/cor.qrpj, more/cor/src/cor.qrpj" + HERE]),
     ({"tree/app/src/app.cpp": None}, [], [LISTED, LEFT_OUT + "tool"]),
-    ({"tree/app/src/app.cpp": None}, ["mode=gen"], [LISTED]),
     (source('@import "core.h"'), [], ["no project lists tool/src/core.h or core.h or tool/core.h"]),
     ({"tree/all.qrws": '@import "x.inc"\n"all" { }'}, [], ["not found as x.inc, tree/x.inc, more/x.inc" + HERE]),
     # Invalid words, in the file and on the command line.
@@ -82,7 +81,6 @@ CASES = [
     ({"main.qrex": "moed = build"}, [], ["no statement begins so; Qrex --help lists the keys"]),
     (tool('"tool.cpp" : exlude', "", "Utility Project"), [], ["an option of a file is one of exclude, +cpp, -cpp"]),
     ({}, ["rebuildAll=true", "mode=biuld"], [MODES, ON_COMMAND_LINE + "mode=biuld"]),
-    ({}, ["mode="], [MODES, ON_COMMAND_LINE + "mode="]),
     ({}, ['@fail("no")'], [ON_COMMAND_LINE + '@fail("no")']),
     ({}, ['config="Fast"'], ["tree/core/src/core.qrpj has Debug|x64", LEFT_OUT + "app tool"]),
     # What this program, or the compiler, does not build.
@@ -93,7 +91,6 @@ CASES = [
      ["translateOnly=false", 'PATH("x64") = { "none" }'],
      ["an .asm is given to ml /coff; this compiler has no assembler of its own for it"]),
     (COPIED, [], [IS_COPIED]),
-    (COPIED, ["mode=gen"], [IS_COPIED]),
     # An import that cannot be used.
     ({**IMPORTED, **tool('"tool.h" "tool.cpp"', kind="Static Library")}, ["translateOnly=false"],
      ["app/src/app.cpp imports it" + FIRST, LEFT_OUT + "tool"]),
@@ -107,7 +104,6 @@ CASES = [
                          "file otherwise"]),
     ({**ALL, "all.qrex": SETTINGS_OF_ALL}, ["mode=gen"], []),
     (ALL, ["mode=gen", "compiler=vc14"], []),
-    ({}, ["mode=gen"], []),
     ({"main.qrex": SETTINGS_OF_ALL + "mode = gen\n"}, [],
      ["make translates by Qrex main.qrex, and mode = gen stands there: write mode = build, and call Qrex main.qrex mode=gen for the "
       "make files"]),
@@ -121,7 +117,6 @@ CASES = [
      ["nothing of std is reflected: write string8 for std::string, xvector<T> for std::vector<T>, xmap<K,V> for std::map<K,V>"]),
     # A project file that misleads.
     (BLOCK, [], BLOCK_HINTS),
-    ({**BLOCK, "main.qrex": BLOCK["main.qrex"].replace("= gcc", "= vc14")}, [], BLOCK_HINTS),
     (tool('"tool.cpp"', root="tul"), [], ["tul/src/tool.cpp is listed in tree/tool/src/tool.qrpj(8), and tree/tool/src/tool.qrpj "
                                           'does not stand below its $ROOT_TO_PROJDIR, "tul"']),
 ]

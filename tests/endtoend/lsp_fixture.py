@@ -2,7 +2,6 @@
 
 import json
 import queue
-import shutil
 import subprocess
 import threading
 from pathlib import Path

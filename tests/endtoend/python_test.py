@@ -2,11 +2,9 @@
 """Runs of the tool that use Python, and runs that must not need it."""
 
 import re
-from pathlib import Path
 
-from workspace_fixture import Skipped, Workspace, equal, holds, project, run_tests, workspace_of
+from workspace_fixture import ROOT, Skipped, Workspace, equal, holds, indented, project, run_tests, workspace_of
 
-DOCS = Path(__file__).parents[2] / "docs/python.md"
 MISSING = "/nonexistent/libpython.so"
 
 
@@ -67,8 +65,7 @@ def test_the_folder_of_the_run_stays_and_prints_keep_their_order(binary):
 
 def test_the_documented_example(binary):
     need_python(binary)
-    blocks = re.findall(r"(?m)(?:^    .*\n)+", DOCS.read_text())
-    table, header, expected = (re.sub(r"(?m)^    ", "", block) for block in blocks)
+    table, header, expected = (block for _, block in indented((ROOT / "docs/python.md").read_text()))
     _, generated = translate(binary, {"commands.csv": table, "commands.h": header})
     holds(re.sub(r"(?m)^ +\n", "", generated["commands.h"]), expected)  # without the lines that @for leaves blank
 

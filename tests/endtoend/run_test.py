@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""Whole runs: modes, what a second run leaves alone, bad input, the files that a run keeps.
+"""Whole runs: modes, what a second run leaves alone, bad input, what is in the way, other runs.
 
 Usage: run_test.py BINARY [TEST...]. Each test is a function that works in a folder of its own."""
 
@@ -7,6 +7,7 @@ import os
 import re
 import shutil
 import subprocess
+import time
 
 from run_fixture import (BINARY, CONFIG, HEAD, PROJECT, DEPENDENCIES, TRANSLATED, EACH_RUN, JUNK, write, read,
                          write_tree, run, expect, files_of, leftovers, contents, times, changed, is_read_only, edit,
@@ -24,10 +25,9 @@ def test_a_second_run_leaves_all_alone():
           'Building workspace [ws/all.qrws]\n', 'Writing out/uinc/app/src/app.qrpj\n',
           '\n------------------------------------- app  [Debug|x64] ------------------------------------------\n')
     expect(re.search(r'\napp\.{85} +\d+\.\d\d ms\n\nCompleted\.{79} +\d+\.\d\d ms\n$', text), text)
-    expect(files_of('out') == ['out/tinc/app/a.h', 'out/tinc/app/b.h', 'out/tinc/app/c.h', 'out/tinc/app/n.txt',
-                               'out/uinc/.qrwsroot', 'out/uinc/app/a.h', 'out/uinc/app/b.h', 'out/uinc/app/c.h',
-                               'out/uinc/app/n.txt', 'out/uinc/app/src/app.qrpj', 'out/uinc/ws/all.qrws'],
-           files_of('out'))
+    headers = ['app/a.h', 'app/b.h', 'app/c.h', 'app/n.txt']
+    others = ['out/uinc/.qrwsroot', 'out/uinc/app/src/app.qrpj', 'out/uinc/ws/all.qrws']
+    expect(files_of('out') == sorted([f'out/{kind}/{name}' for kind in ('tinc', 'uinc') for name in headers] + others), files_of('out'))
     expect(read('out/tinc/app/b.h') == read(TRANSLATED + 'b.h') != read('tree/app/b.h'), 'translated header')
     expect(read('out/uinc/app/b.h') == read('tree/app/b.h'), 'untranslated header')
     for path in files_of('out', 'qrexsource'):
@@ -201,6 +201,73 @@ def test_identifier_file_that_cannot_be_written():
     os.chmod('projects.guids', 0o444)
     holds(run(), "Error : Couldn't write projects.guids\n", '\nCompleted')
     expect(read('projects.guids')[-1] == 15, 'untouched')
+
+
+# --- What is in the way, and other runs. Failing calls and kills: tests/faults
+
+def without_times(files):
+    return {path: content for path, content in files.items() if path not in EACH_RUN}
+
+
+def test_what_is_in_the_way():
+    write_tree()
+    write('qrexsource', 'a file')
+    text = run(status=1)
+    holds(text, f'Error: File error ({TRANSLATED}a.h) : The system cannot find the path specified.\n',)
+    os.remove('qrexsource')
+    os.makedirs(TRANSLATED + 'c.h')
+    os.makedirs(TRANSLATED + 'n.txt')
+    holds(run(status=1), f'Error: File error ({TRANSLATED}c.h) : ')
+    os.rmdir(TRANSLATED + 'c.h')
+    holds(run(), f'ERROR: Copy file tree/app/n.txt to {TRANSLATED}n.txt failed\n'
+                 'ERROR : GetLastError() returned 5 : Access is denied.\n')
+    shutil.rmtree('qrexsource')
+    shutil.rmtree('out')
+    os.makedirs('out/uinc/app/src/app.qrpj')
+    os.makedirs('out/uinc/app/c.h')
+    text = run()
+    holds(text, 'Error: File error (out/uinc/app/src/app.qrpj) : ', '\n...Copy file failed\n', '\nCompleted')
+    shutil.rmtree('out')
+    write('out', 'a file')
+    holds(run(), '\n...Copy file failed\n', '\nCompleted')
+
+
+def test_standard_output_that_takes_nothing():
+    write_tree({'tree/app/c.h': 'int c;\n' * 200000})
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    shutil.rmtree('qrexsource')
+    shutil.rmtree('out')
+    expect(subprocess.run(f'"{BINARY}" main.qrex diagnostics=true >&-', shell=True).returncode == 0, 'closed')
+    expect(without_times(contents('qrexsource', 'out')) == wanted, 'what was printed stands in a file')
+    # a pipe that is full for a while and does not block
+    reading, writing = os.pipe()
+    os.set_blocking(writing, False)
+    os.write(writing, b'.' * 60000)
+    process = subprocess.Popen([BINARY, *['a="' + 'x' * 999 + '"'] * 60, 'main.qrex', 'mode=clean'], stdout=writing)
+    os.close(writing)
+    time.sleep(0.2)
+    with os.fdopen(reading) as pipe:
+        holds(pipe.read(), 'argv[60] = ', '\nCompleted')
+    expect(process.wait() == 0, 'status')
+
+
+def test_runs_at_the_same_time():
+    write_tree({'tree/app/c.h': 'int c;\n' * 100000})
+    run()
+    wanted = without_times(contents('qrexsource', 'out'))
+    # each with the process numbers of the others, as in containers of their own
+    apart = ['unshare', '--pid', '--fork']
+    if subprocess.run([*apart, 'true'], stderr=subprocess.DEVNULL).returncode != 0:
+        apart = []
+    for _ in range(4):
+        shutil.rmtree('qrexsource')
+        shutil.rmtree('out')
+        runs = [subprocess.Popen([*apart, BINARY, 'main.qrex'], stdout=subprocess.PIPE, text=True) for _ in range(4)]
+        for process in runs:
+            text = process.communicate()[0]
+            expect(process.returncode == 0 and 'rror' not in text and 'failed' not in text, text)
+        expect(without_times(contents('qrexsource', 'out')) == wanted and not leftovers(), leftovers())
 
 
 run_named(globals())

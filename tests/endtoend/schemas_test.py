@@ -206,22 +206,4 @@ def test_the_release_of_the_target(workspace):
     holds(workspace.run("all.qrex", status=1), "define the target with 12")
 
 
-@in_workspace(KEYED, "git")
-def test_branches_are_merged(workspace):
-    """Git merges what two branches record of different models."""
-    git = "git -c user.name=a -c user.email=a@example.org "
-    workspace.write(".gitignore", "qrexsource/\nout/\n")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} init -q -b one && {git} add . && {git} commit -qm base && {git} checkout -qb two")
-    change(workspace, "Kind", "low, high, last")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam two && {git} checkout -q one")
-    change(workspace, "Other", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam one && {git} merge -q two -m both")
-    workspace.run("all.qrex")
-    holds(lock(workspace), "app Other 10 = +b:int32\n", "low:0 high:1 last:2")
-    equal(workspace.shell(f"{git} status --porcelain"), "")
-
-
 run_tests(globals())

@@ -2,7 +2,6 @@
 """Positions followed between generated text and its sources: by arguments, and as a filter behind other tools."""
 
 import os
-import shutil
 import subprocess
 import time
 
@@ -159,20 +158,6 @@ def test_errors(workspace):
     workspace.write("tree/app/src/app.cpp", "$class {\n")
     holds(workspace.run("--where", "all.qrex", f"{OUT}app.cpp:3", status=1), "tree/app/src/app.cpp(1) : error")
     equal(filtered(workspace, f"{OUT}app.cpp:3\n{OUT}x (1).h:5\n".encode()).decode(), f"{OUT}app.cpp:3\ntree/app/src/x (1).h:1\n")
-
-
-@in_workspace({**FILES, "tree/app/src/a.h": "// first\n\ninline int twice_as(int unused)\n{\n  return 2;\n}\n",
-               "tree/app/src/app.cpp": '@import "a.h"\nint main()\n{\n  return twice_as(1);\n}\n'}, "clang-tidy", "g++", "gdb")
-def test_real_tools(workspace):
-    """What clang-tidy and gdb say of generated text, by pipe."""
-    workspace.run("all.qrex", "compileCommands=true")
-    told = workspace.shell(f"clang-tidy --checks='-*,misc-unused-parameters' --header-filter='.*' {OUT}app.cpp 2>&1 | Qrex --where all.qrex")
-    source = lines_of(workspace, "tree/app/src/a.h")
-    line = next(n for n, text in enumerate(source, 1) if "unused" in text)
-    holds(told, f"{workspace.folder.resolve()}/tree/app/src/a.h:{line}:{source[line - 1].index('unused') + 1}: warning:")
-    workspace.shell(f"g++ -g -O0 -Iqrexsource/x64/Debug/app/src -Iqrexsource/x64/Debug -o prog {OUT}app.cpp")
-    told = workspace.shell("gdb -batch -nx -ex 'break twice_as' -ex run -ex bt prog 2>&1 | Qrex --where all.qrex")
-    holds(told, "twice_as (unused=1) at tree/app/src/a.h:5", "main () at tree/app/src/app.cpp:4")
 
 
 run_tests(globals())

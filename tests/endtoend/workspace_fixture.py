@@ -179,6 +179,19 @@ def lacks(text, part):
     assert part not in text, f"{part!r} stands in\n{text}"
 
 
+def indented(page):
+    """The indented blocks of a page, each with the line of text ahead of it."""
+    found = re.findall(r"^(\S.*)\n\n((?:    .*\n|\n+(?=    ))+)", page, re.MULTILINE)
+    return [(ahead, re.sub(r"^    ", "", block, flags=re.MULTILINE)) for ahead, block in found]
+
+
+def install(binary, prefix):
+    """The tool and its runtime, below a prefix."""
+    for component in ("tool", "runtime"):
+        subprocess.run(["cmake", "--install", os.path.dirname(os.path.abspath(binary)), "--prefix", prefix, "--component", component],
+                       check=True, stdout=subprocess.DEVNULL)
+
+
 def need(*tools):
     for tool in tools:
         if not shutil.which(tool):
