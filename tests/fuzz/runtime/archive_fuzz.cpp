@@ -107,18 +107,36 @@ bool IsRead(Bytes const& bytes, Read read, Use use) {
   return isRead;
 }
 
-template <typename T, bool HasReferences>
-void ReadAndTakeApart(Bytes const& bytes, Bytes const& seed) {
-  const auto read = [](vesk::InputArchive& ar) {
-    T value = T();
-    ar >> value;
-    return value;
-  };
-  const bool isRead = IsRead(bytes, read, UseValue<T, HasReferences>);
+template <typename T>
+T ReadAs(vesk::InputArchive& ar) {
+  T value = T();
+  ar >> value;
+  return value;
+}
+
+template <typename T>
+void TakeApart(Bytes const& bytes, Bytes const& seed, bool isRead) {
   UseView(vesk::ArchiveView::Of<T>(bytes), vesk::ArchiveView::Of<T>(seed), isRead);
   vesk::ArchiveOptions few;
   few.m_parts = 5;
   CheckParts(vesk::ArchiveView::Of<T>(bytes, few));
+}
+
+template <typename T, bool HasReferences>
+void ReadAndTakeApart(Bytes const& bytes, Bytes const& seed) {
+  TakeApart<T>(bytes, seed, IsRead(bytes, ReadAs<T>, UseValue<T, HasReferences>));
+}
+
+// Elements without a record, of no bytes.
+void ReadNothings(Bytes const& bytes, Bytes const&) {
+  using Nothings = vesk::xvector<kinds::None>;
+  (void)IsRead(bytes, ReadAs<Nothings>, UseValue<Nothings, false>);
+}
+
+// Elements that are not printed.
+void TakeModelsApart(Bytes const& bytes, Bytes const& seed) {
+  using Models = vesk::xvector<kinds::Direct>;
+  TakeApart<Models>(bytes, seed, IsRead(bytes, ReadAs<Models>, Written<Models>));
 }
 
 template <typename Interface>
@@ -148,13 +166,13 @@ const Take kKinds[] = {
     ReadAndTakeApart<vesk::openvariant<vesk::int32>, true>,
     ReadAndTakeApart<kinds::Doc, true>,
     ReadAndTakeApart<kinds::NoOps, false>,
-    ReadAndTakeApart<vesk::xvector<kinds::None>, false>,
+    ReadNothings,
     ReadAndTakeApart<vesk::xmap<vesk::string8, vesk::xvector<kinds::Size>>, false>,
     ReadAndTakeApart<vesk::xlist<vesk::xset<vesk::int16>>, false>,
     ReadAndTakeApart<vesk::DynArray<vesk::string16>, false>,
     ReadAndTakeApart<vesk::xvector<shapes::Colour>, false>,
     ReadAndTakeApart<vesk::xvector<vesk::cref<kinds::Size>>, true>,
-    ReadAndTakeApart<vesk::xvector<kinds::Direct>, false>,
+    TakeModelsApart,
     ReadObjects,
 };
 constexpr std::size_t kKindCount = sizeof(kKinds) / sizeof(*kKinds);
