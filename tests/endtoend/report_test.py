@@ -29,6 +29,7 @@ FILES = {
     "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }', 'subproj { "core" }'),
     "tree/app/src/app.cpp": '@import "core/c.h"\nint main() {}\n',
 }
+RIGHT, LEFT, DOWN, ENTER, ESCAPE = "\ue014", "\ue012", "\ue015", "\ue007", "\ue00c"  # as the driver has them
 TRACE, REPORT = 'buildTrace="out/trace.json"', 'report="out/report.html"'
 HOSTILE = "core/src/</script><b>.cpp"
 
@@ -52,8 +53,7 @@ def page_data(workspace):
 
 def counted(log):
     """Warnings and errors, as the last line has them."""
-    found = re.search(r"Completed with (\d+) warnings, (\d+) errors", log)
-    return (int(found.group(1)), int(found.group(2))) if found else (0, 0)
+    return tuple(map(int, re.search(r"Completed with (\d+) warnings, (\d+) errors", log).groups()))
 
 
 def compiled(workspace):
@@ -110,10 +110,8 @@ def test_trace_of_a_run_that_fails(workspace):
 
 def shown_steps(browser):
     """What the timeline shows undimmed, by the file or output of each."""
-    return sorted(browser.run("""return [...document.querySelectorAll("rect.step:not(.dim)")].map((rect) => {
-        const span = spans[rect.dataset.span];
-        return `${span.kind} ${nameOf(span)}`;
-    })"""))
+    return sorted(browser.run("""return [...document.querySelectorAll("rect.step:not(.dim)")]
+        .map((rect) => spans[rect.dataset.span]).map((span) => `${span.kind} ${nameOf(span)}`)"""))
 
 
 def hostile_files():
@@ -130,7 +128,8 @@ def test_page_in_a_browser(workspace):
         look_at_messages(browser)
         filter_by_click(browser)
         go_by_keys(browser)
-        look_at_narrow_page(browser)
+        fits(browser, 400, "timeline", f"timeline/{HOSTILE}", "files", "headers", "messages")
+        browser.resize(1280, 900)
         time.sleep(0.02)
         workspace.write("tree/core/c.h", "$enum+ E { e1, e2 };\n")
         workspace.run("all.qrex", REPORT)
@@ -145,10 +144,10 @@ def test_page_in_a_browser(workspace):
 
 def look_at_figures(browser, log):
     figures = dict(zip(browser.texts("#figures dt"), browser.texts("#figures dd")))
-    equal((int(figures["Warnings"]), int(figures["Errors"])), counted(log))
+    warnings, errors = counted(log)
+    equal([figures[name] for name in ("Warnings", "Errors", "Objects", "Slots")], [str(warnings), str(errors), "5", "2"])
     milliseconds = float(re.search(r"Completed.*?([\d.]+) ms", log).group(1))
     assert abs(browser.run("return data.total") / 1000 - milliseconds) < 50, (figures, milliseconds)
-    equal((figures["Objects"], figures["Slots"]), ("5", "2"))
     equal(browser.texts("#verdict"), ["Completed with errors"])
 
 
@@ -181,19 +180,18 @@ def filter_by_click(browser):
 
 
 def go_by_keys(browser):
-    right, left, down, enter, escape = "\ue014", "\ue012", "\ue015", "\ue007", "\ue00c"
-    browser.press(".scroller", right)
+    browser.press(".scroller", RIGHT)
     first = browser.texts(".told")[0]
     holds(first, "translated in", "why: no earlier build")
-    browser.press(".scroller", right, right, left, left, "+", "-")
+    browser.press(".scroller", RIGHT, RIGHT, LEFT, LEFT, "+", "-")
     equal(browser.texts(".told")[0], first)
-    browser.press(".scroller", down)
+    browser.press(".scroller", DOWN)
     holds(browser.texts(".told")[0], "compiled in", "slot 1")
-    browser.press(".scroller", enter)
+    browser.press(".scroller", ENTER)
     holds(browser.texts(".filter")[0], browser.texts(".told a")[0])
-    browser.press(".scroller", escape)
+    browser.press(".scroller", ESCAPE)
     equal(browser.texts(".filter"), [])
-    browser.press("#tab-timeline", right)
+    browser.press("#tab-timeline", RIGHT)
     equal(browser.run("return document.activeElement.id"), "tab-files")
     equal(browser.texts('[aria-selected="true"]'), ["Files"])
     nameless = """return [...document.querySelectorAll("a, button, input, [role]")].filter((element) =>
@@ -201,12 +199,11 @@ def go_by_keys(browser):
     equal(browser.run(nameless), 0)
 
 
-def look_at_narrow_page(browser):
-    browser.resize(400, 800)
-    for tab in ("timeline", f"timeline/{HOSTILE}", "files", "headers", "messages"):
+def fits(browser, width, *tabs):
+    browser.resize(width, 800)
+    for tab in tabs:
         browser.go(tab)
-        assert browser.run("return document.documentElement.scrollWidth") <= 400, tab
-    browser.resize(1280, 900)
+        assert browser.run("return document.documentElement.scrollWidth") <= width, tab
 
 
 MODELS = r'''@import "Vesk/vxObject/IObject.h"
@@ -252,20 +249,16 @@ def test_page_without_a_build(workspace):
         look_at_history(browser)
         look_at_imports(browser)
         for width in (400, 1280):
-            browser.resize(width, 800)
-            for tab in ("models", "models/Note", "history", "history/Note", "imports", "imports/app/a.h"):
-                browser.go(tab)
-                assert browser.run("return document.documentElement.scrollWidth") <= width, tab
+            fits(browser, width, "models", "models/Note", "history", "history/Note", "imports", "imports/app/a.h")
         equal(browser.texts("main b:not(.path), main i"), [])
         equal((browser.console(), set(browser.requests())), ([], {f"file://{workspace.path('out/page.html')}"}))
 
 
 def look_at_declarations(browser):
-    found = lambda: [text.split("\n")[0] for text in browser.texts("#panel-models tbody th")]
     for words, names in (("mm", {"Note", "Point"}), ("mm script", {"Point"}), ("ISHAPE", {"IShape", "IShapeDelegatorMixin", "Page"}), ("head", {"Note"})):
         browser.run("document.querySelector('#panel-models input').value = ''")
         browser.press("#panel-models input", words)
-        equal(set(found()), names)
+        equal({text.split("\n")[0] for text in browser.texts("#panel-models tbody th")}, names)
     browser.go("models/Point")
     equal(browser.texts("#panel-models tbody tr")[0], 'x vesk::int32 mm "</script><i>"')
     holds("\n".join(browser.texts(".facts")), "tree/app/a.h:6", "Held (field at)")
@@ -277,7 +270,7 @@ def look_at_declarations(browser):
 
 def look_at_history(browser):
     """Of a name that changed twice, of what is computed, and of a release that is left out."""
-    browser.press("#tab-models", "\ue014")
+    browser.press("#tab-models", RIGHT)
     holds("\n".join(browser.texts("#panel-history tbody tr")), "Note", "4 2 1 1 2")
     browser.click('#panel-history a[href="#history/Note"]')
     equal([row.split("\n")[0] for row in browser.texts("#panel-history .plain tbody th")], ["name", "inches", "head", "width", "title"])
@@ -290,18 +283,17 @@ def look_at_history(browser):
 
 
 def look_at_imports(browser):
-    right, left, up, enter = "\ue014", "\ue012", "\ue013", "\ue007"
     browser.go("imports/app/a.h")
     equal(shown_nodes(browser), ["app/a.h", "Vesk/vxObject/IObject.h", "app/</b>.h", "app/b.h"])
-    browser.press("#panel-imports .scroller", left)
+    browser.press("#panel-imports .scroller", LEFT)
     holds(browser.texts("#panel-imports .told")[0], "app/b.h; project app; imports 1 file", "imported by 1 file, 1 in all; folded")
     browser.press("#panel-imports .scroller", " ")
     assert "app/src/app.cpp" in shown_nodes(browser) and "unfolded" in browser.texts("#panel-imports .told")[0]
-    browser.press("#panel-imports .scroller", " ", left, enter)
+    browser.press("#panel-imports .scroller", " ", LEFT, ENTER)
     equal(browser.texts("#panel-imports h2"), ["Imports around app/b.h"])
     browser.go("imports/app/</b>.h")
     equal(shown_nodes(browser), ["app/</b>.h", "app/a.h", "20 filesapp/src/"])
-    browser.press("#panel-imports .scroller", left, "\ue015", " ")
+    browser.press("#panel-imports .scroller", LEFT, DOWN, " ")
     equal(len(shown_nodes(browser)), 23)
     holds("\n".join(browser.texts("#panel-imports tbody tr")), "app/src/m7.cpp importing app 1", "app/src/app.cpp\nby way of app/b.h\nimporting app 3")
 
