@@ -5,63 +5,12 @@ import re
 from pathlib import Path
 
 from runtime_fixture import translate, translated_shop, write_library
-from workspace_fixture import equal, holds, lacks, need, run_tests
+from workspace_fixture import data, equal, holds, lacks, need, run_tests
 
 KEY = "lineDirectives = true "
 OUT = "qrexsource/x64/Debug/"
-SHOP = """@import "Vesk/vxObject/IObject.h"
-@def sum_of(a, b) =
-{
-  int sum = a;
-  sum += b;
-}
-namespace shop
-{
-$enum Kind
-{
-  small,
-  large
-};
-$struct Shelf
-{
-  $int32 pieces;
-  $dep int32 twice
-    calc
-    {
-      int unused;
-      twice = pieces * 2;
-    };
-  $int32 Sold(int32 count)
-  {
-    pieces -= count;
-    return pieces;
-  }
-  $dep int32 half =
-    {
-      half = pieces / 2;
-    };
-};
-inline int Counted(int more)
-{
-  sum_of(more, 1)
-  return sum;
-}
-}
-"""
-MAIN = """@import "shop.h"
-#include <cassert>
-
-int main(int count, char**)
-{
-  shop::Shelf shelf;
-  shelf.pieces = 7;
-  int left = shelf.Sold(2);
-  left += shop::Counted(count);
-  left += shelf.twice + shelf.half;
-  assert(left != 19);
-  return left == 19 ? 0 : 1;
-}
-"""
+SHOP = data("line_directives/shop.h")
+MAIN = data("line_directives/app.cpp")
 
 
 def line_of(text, what):

@@ -9,7 +9,7 @@ import sys
 import time
 from pathlib import Path
 
-from workspace_fixture import ROOT, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
+from workspace_fixture import ROOT, data, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 APP_FILES = '"src" { "a.h" "\u00e4 b.h" "b.cpp" "c.cpp" "app.cpp" }'
 FILES = {
@@ -80,27 +80,7 @@ def test_models(workspace):
           ({"Inner", "Note", "n::Plain"}, edges[:2]))
 
 
-REFLECTED = r'''@import "Vesk/vxObject/IObject.h"
-namespace geo
-{
-    $enum+ Side : [ "of a box", [ 1, -2.5, true ], Unit("m", 3) ]
-    {
-        left = 3,
-        right
-    };
-    $struct+ Point { $int32:[ "low < \"high\" \\ \t" ] x; $xmap<string8,Side> sides; $int32 edge[3]; };
-    $function+ Point Move(Point const& from, int32 by = 1 + 2);
-    $function+ int32 Move(int32 by);
-}
-$model+ Note
-{
-    string8 text;
-    $dropped { int32 seconds; }
-    $schema { 1: +seconds 4: -seconds +text }
-    $evolve { text(seconds) { text = seconds > 0 ? "late" : ""; } }
-};
-$type+ xvector<xvector<int32> >;
-'''
+REFLECTED = data("questions/reflected.h")
 
 
 @in_workspace({**MODELS, "tree/app/src/a.h": REFLECTED, "tree/app/src/app.cpp": '@import "a.h"\nint main() { return 0; }\n'})

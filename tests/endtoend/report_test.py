@@ -10,7 +10,7 @@ import time
 from pathlib import Path
 
 from browser_fixture import Browser, with_selenium
-from workspace_fixture import ROOT, comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
+from workspace_fixture import ROOT, comparable, data, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 with_selenium()
 
@@ -206,21 +206,7 @@ def fits(browser, width, *tabs):
         assert browser.run("return document.documentElement.scrollWidth") <= width, tab
 
 
-MODELS = r'''@import "Vesk/vxObject/IObject.h"
-@print("printed ")
-$interface+ IShape : vesk::IObject { float64 Area(int32 places = 2) const; };
-$enum Side { left, right = 7 };
-$struct Point { $int32:[ unit("mm"), "</script><i>" ] x; $xmap<string8,Side> sides; };
-$model+ Note
-{
-    string8 title;
-    float64 width : [ unit("mm") ];
-    $dropped { string8 head; string8 name; int32 inches; }
-    $schema { 1: +name +inches 2: -name +head 4: -inches -head +width +title }
-    $evolve { head(name) { head = name; } title(head) { title = head; } width(inches) { width = inches * 25.4; } }
-};
-$class+ Page isa IShape : model Note { };
-'''
+MODELS = data("report/models.h")
 DECLARING = {
     **workspace_of("app", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n'),
     "tree/app/src/app.qrpj": project("Console Application", "app", '"a.h" "b.h" "<" { "b>.h" } "src" { "app.cpp" "m*.cpp" }',

@@ -8,43 +8,10 @@ from pathlib import Path
 from random import Random
 
 from lsp_fixture import Client, server_beside, uri_of
-from workspace_fixture import ROOT, Skipped, Workspace, equal, holds, lacks, need, project, run_tests, workspace_of
+from workspace_fixture import ROOT, Skipped, Workspace, data, equal, holds, lacks, need, project, run_tests, workspace_of
 
-HEADER = """@import "Vesk/vxObject/IObject.h"
-@def twice(x) = ((x) + (x))
-
-namespace geo
-{
-$struct+ Shape <<compare>>
-{
-    $float64 width;
-    $float64 Area(float64 factor) const
-    {
-        float64 result = width * factor;
-        return twice(result);
-    }
-};
-$class+ Circle : model
-{
-    float64 radius;
-}
-{
-    explicit $$(float64 r) { _model_.radius = r; }
-};
-}
-"""
-MAIN = """@import "shape.h"
-// Größe 😀 of things
-int main()
-{
-    geo::Circle circle(2);
-    geo::Shape shape;
-    /* 😀ü */ double size = circle.Getradius() + shape.Area(2);
-    int count = 1;
-    count += twice(count);
-    return count + (size > 3);
-}
-"""
+HEADER = data("server/shape.h")
+MAIN = data("server/app.cpp")
 CODES = "namespace codes\n{\n$enum+ Code { fine, lost };\n}\n"
 PLAIN = "tree/plain/src/plain.qrpj"
 SHAPE, APP, PROJECT = "tree/app/src/shape.h", "tree/app/src/app.cpp", "tree/app/src/app.qrpj"

@@ -87,6 +87,11 @@ PROGRAM_FILES = {
 }
 
 
+def data(name):
+    """A source that a test translates."""
+    return (ROOT / "tests/endtoend/data" / name).read_text()
+
+
 class Skipped(Exception):
     """A test needs a tool that is not installed; the text names it."""
 
