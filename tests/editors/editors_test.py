@@ -30,13 +30,17 @@ def run(command, **options):
     return done.stdout
 
 
+def vim(editor, *arguments, **options):
+    """What it prints, with our files."""
+    need(editor)
+    return run([*VIMS[editor], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after", *arguments], **options)
+
+
 def vim_answers(editor, folder, questions):
     """What check.vim answers in `folder` to questions [kind, file, line, column]."""
-    need(editor)
     answers = Path(folder) / "answers.json"
-    run([*VIMS[editor], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-         "--cmd", f"let g:questions = {json.dumps(questions)}", "--cmd", f"let g:answers = '{answers}'",
-         "-c", f"source {HERE}/vim/check.vim"], cwd=folder)
+    vim(editor, "--cmd", f"let g:questions = {json.dumps(questions)}", "--cmd", f"let g:answers = '{answers}'",
+        "-c", f"source {HERE}/vim/check.vim", cwd=folder)
     return json.loads(answers.read_text())
 
 
@@ -122,7 +126,6 @@ def session(language):
 
 
 def test_nvim_session(_binary):
-    need("nvim")
     steps = ["error wrong cpp", "mapped true v:lua.vim.lsp.omnifunc", "shown // $CLASS WRONG| cpp false", "follows // INT SECOND;|",
              "error wrong qrex", "clients 1", r'options {"arguments": ["config=\"Debug\""]} arguments []', "shown there 1",
              "elsewhere cpp 0"]
@@ -130,8 +133,7 @@ def test_nvim_session(_binary):
         with session("lua") as (_, options):
             if newer:
                 options["env"]["QREX_NEWER"] = newer
-            output = run([*VIMS["nvim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-                          "-c", f"luafile {HERE}/vim/session.lua"], **options).splitlines()
+            output = vim("nvim", "-c", f"luafile {HERE}/vim/session.lua", **options).splitlines()
         equal([line for line in output if not line.startswith("vim.lsp.start")], steps)
         equal([line for line in output if line.startswith("vim.lsp.start")], ["vim.lsp.start qrex w"] * 2 if newer else [])
 
@@ -149,19 +151,16 @@ def test_nvim_tour(binary):
         tour.write_text(tour.read_text().replace("../../runtime", str(ROOT / "runtime")))
         (work.parent / "bin/qrex-lsp").unlink()
         (work.parent / "bin/qrex-lsp").symlink_to(server)
-        output = run([*VIMS["nvim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-                      "-c", f"luafile {HERE}/vim/tour.lua"], **options).splitlines()
+        output = vim("nvim", "-c", f"luafile {HERE}/vim/tour.lua", **options).splitlines()
     equal(output, ["error: $dep flaot64 subtotal = { subtotal = pieces * price; };", "completes: Getpieces",
                    'leads to: order.h int32 pieces : [ unit("piece"), 1 ];', "renamed: orders1::Order first_release;"])
 
 
 def test_vim_session(_binary):
-    need("vim")
     if not Path("/usr/share/vim/vimfiles/pack/dist-bundle/opt/ale").is_dir():
         raise Skipped("vim-ale")
     with session("vim") as (folder, options):
-        run([*VIMS["vim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-             "-c", f"source {HERE}/vim/session_ale.vim"], **options)
+        vim("vim", "-c", f"source {HERE}/vim/session_ale.vim", **options)
         equal((folder / "errors.txt").read_text().splitlines(), ["wrong cpp", "wrong qrex"])
 
 
