@@ -45,19 +45,21 @@ def workspace_of(*names, settings=""):
     return {"all.qrex": SETTINGS + settings, "tree/.qrwsroot": "", "tree/all.qrws": f'"all" {{ {listed} }}\n'}
 
 
-def stand_ins(ahead="", linking=""):
+def stand_ins(compiling="", linking="", archiving=""):
     """Tools of the gcc family: an object is its source, a library or program what went into it. What runs ahead of a compilation
-    has $object and $source, what runs ahead of a link $target."""
+    has $object and $source, ahead of the others $target."""
     return {"tools/gcc-4": f"""#!/bin/bash
 text=$(tr -d '\\r' < "${{2#@}}"); object=${{text#*-o \\"}}; object=${{object%%\\"*}}; source=${{text##* \\"}}; source=${{source%\\"*}}
-{ahead}
+{compiling}
 cat "$source" > "$object"
-""", "tools/ar": """#!/bin/sh
-cat $(tr -d '"\\r' < "${3#@}") > "$2"
+""", "tools/ar": f"""#!/bin/sh
+target=$2
+{archiving}
+cat $(tr -d '"\\r' < "${{3#@}}") > "$target"
 """, "tools/g++": f"""#!/bin/sh
 text=$(tr -d '"\\r' < "${{1#@}}"); set -- $text; target=$2; shift 2
 {linking}
-{{ echo "$text"; for word; do [ ! -f "$word" ] || cat "$word"; done; }} > "$target"
+{{ echo "$text"; for word; do case $word in -*|*ORIGIN*) ;; *) cat "$word" || exit 1;; esac; done; }} > "$target"
 """}
 
 
