@@ -4,7 +4,7 @@
 import re
 import xml.etree.ElementTree as XmlTree
 
-from workspace_fixture import CACHE, ROOT, Workspace, data, equal, holds, lacks, need, run_tests
+from workspace_fixture import CACHED, ROOT, Workspace, data, equal, holds, lacks, need, run_tests
 
 PRINTERS = ROOT / "runtime/debug/vesk_gdb.py"
 NATVIS = ROOT / "runtime/debug/vesk.natvis"
@@ -68,7 +68,7 @@ def test_first_workspace(binary):
                           '@import "Vesk/vxObject/IObject.h"\n@import "Vesk/vxObject/DebugScript.h"\n'
                           '@import "zoo_core/api/more.h"\n'
                           f'vxDebugScript("{PRINTERS}")\n')
-        holds(workspace.run("zoo.qrex", f'PATH("x64") = {{ "{CACHE}" "/usr/bin" "/bin" }}'), "\nCompleted.")
+        holds(workspace.run("zoo.qrex", CACHED), "\nCompleted.")
         stop = ["break animals::Animal::FoodPerDay", "run >/dev/null", "up"]
         there = gdb(workspace, "zoo_app", "break Stop", "run >/dev/null", "up", "info locals", "continue", "delete", *stop,
                     "print leo", "set var leo.diet.m_value = 7", "print leo.diet", options="-iex 'add-auto-load-safe-path /'")

@@ -6,7 +6,7 @@ import shutil
 import xml.etree.ElementTree as XmlTree
 
 from runtime_fixture import has_header
-from workspace_fixture import COMPILERS, ROOT, Skipped, Workspace, equal, holds, lacks, need, run_tests
+from workspace_fixture import CACHED, COMPILERS, ROOT, Skipped, Workspace, equal, holds, lacks, need, run_tests
 
 # Folder, name of the workspace, program. What it writes stands in expected.txt.
 EXAMPLES = [("first", "first", "app"), ("evolution", "evolution", "notes"), ("shapes", "geometry", "app"), ("tour", "tour", "app")]
@@ -30,7 +30,7 @@ def test_a_run_builds_them(binary):
     need("g++")
     for folder, name, program in EXAMPLES[:-1]:  # that of the tour stands in runtime_test.py
         with copy(binary, folder) as workspace:
-            holds(workspace.run(f"{name}.qrex"), "Completed.")
+            holds(workspace.run(f"{name}.qrex", CACHED), "Completed.")
             equal(workspace.shell(f"out/lib/x64/Debug/{program}"), expected(folder))
 
 
@@ -55,7 +55,7 @@ def test_processes_call_each_other(binary):
     if not has_header("boost/asio.hpp"):
         raise Skipped("boost/asio.hpp")
     with copy(binary, "remote") as workspace:
-        holds(workspace.run("remote.qrex"), "Completed.")
+        holds(workspace.run("remote.qrex", CACHED), "Completed.")
         output = workspace.shell("""
             board=out/lib/x64/Debug/board
             $board serve port 2 > server.txt & server=$!

@@ -12,7 +12,7 @@ import time
 
 from browser_fixture import Browser, with_selenium
 from inspector_fixture import ADDRESSES, THREADS, Page, Program, built
-from workspace_fixture import ROOT, Workspace, equal, holds, need, run_tests
+from workspace_fixture import CACHED, ROOT, Workspace, equal, holds, need, run_tests
 
 with_selenium()
 
@@ -358,7 +358,7 @@ def test_example(binary):
         shutil.copytree(ROOT / "examples/inspector/tree", workspace.path("tree"))
         text = (ROOT / "examples/inspector/inspector.qrex").read_text()
         workspace.write("inspector.qrex", text.replace("../../runtime", str(ROOT / "runtime")))
-        holds(workspace.run("inspector.qrex"), "\nCompleted..")
+        holds(workspace.run("inspector.qrex", CACHED), "\nCompleted..")
         holds(workspace.shell("out/lib/x64/Debug/greenhouse 1"), "Look at http://127.0.0.1:", "\nAfter ", " minutes: Sweet Million is 10.", " cm high")
 
 
@@ -373,7 +373,7 @@ def test_new_workspace(binary):
         workspace.replace(source, '@import "Vesk/vxObject/IObject.h"\n', f'@import "Vesk/vxObject/IObject.h"\n{head}\n')
         text = workspace.path(source).read_text()
         workspace.path(source).write_text(text[:text.rindex("}")] + "\n".join(body) + "\n}\n")
-        workspace.shell("cd zoo && Qrex zoo.qrex")
+        workspace.shell(f"cd zoo && Qrex zoo.qrex '{CACHED}'")
         process = subprocess.Popen([workspace.path("zoo/out/lib/x64/Debug/zoo_app")], stdout=subprocess.PIPE, text=True)
         try:
             address = next(line for line in process.stdout if line.startswith("Inspector: ")).split()[-1]

@@ -32,6 +32,8 @@ LIB("x64") = { "/usr/lib" }
 CACHE = "/usr/lib/ccache"
 if os.path.isdir(CACHE):
     os.environ.update(PATH=f"{CACHE}:{os.environ['PATH']}", CCACHE_BASEDIR=tempfile.gettempdir(), CCACHE_NOHASHDIR="1")
+# A line of the command line: these compilers also where the settings name others.
+CACHED = f'PATH("x64") = {{ "{CACHE}" "/usr/bin" "/bin" }}'
 
 
 def project(kind, root, files, statements=""):
