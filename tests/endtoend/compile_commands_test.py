@@ -99,13 +99,15 @@ def test_examples(binary):
             text = workspace.path(f"{name}.qrex").read_text()
             workspace.write(f"{name}.qrex", text.replace("../../runtime", str(ROOT / "runtime")))
             workspace.run(f"{name}.qrex", "translateOnly=true", "compileCommands=true", "mode=build")
-            own = {entry["file"]: entry["arguments"] for entry in entries(workspace) if folder == "tour" or "/Vesk/" not in entry["file"]}
+            own = {entry["file"]: entry["arguments"] for entry in entries(workspace)
+                   if folder == "tour" or "/Vesk/" not in entry["file"]}
             assert own, folder
             for file, words in own.items():
                 workspace.path(words[words.index("-o") + 1]).parent.mkdir(parents=True, exist_ok=True)
                 workspace.shell(shlex.join([*words, "-fsyntax-only"]))
                 if server:
-                    holds(workspace.shell(f"{server} --check='{file}' --check-locations=0 2>&1"), "compile_commands.json", "completed, 0 errors")
+                    checked = workspace.shell(f"{server} --check='{file}' --check-locations=0 2>&1")
+                    holds(checked, "compile_commands.json", "completed, 0 errors")
     if not server:
         raise Skipped("clangd-19")
 

@@ -9,7 +9,8 @@ from runtime_fixture import has_header
 from workspace_fixture import CACHED, COMPILERS, ROOT, Skipped, Workspace, equal, holds, lacks, need, run_tests
 
 # Folder, name of the workspace, program. What it writes stands in expected.txt.
-EXAMPLES = [("first", "first", "app"), ("evolution", "evolution", "notes"), ("shapes", "geometry", "app"), ("tour", "tour", "app")]
+EXAMPLES = [("first", "first", "app"), ("evolution", "evolution", "notes"), ("shapes", "geometry", "app"),
+            ("tour", "tour", "app")]
 
 
 def expected(folder):

@@ -14,7 +14,8 @@ FILES = {
     "tree/lib/src/lib.qrpj": project("Static Library", "lib", '"lib.h" "src" { "lib.cpp" "more.cpp" }', "+cpp { -O1 }"),
     "tree/lib/lib.h": "int lib;\n", "tree/lib/src/lib.cpp": '@import "lib.h"\nint of_lib;\n',
     "tree/lib/src/more.cpp": "int more;\n",
-    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }', '+cpp { -O1 }\nsubproj { "lib" }\n+link { -lm }'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }',
+                                     '+cpp { -O1 }\nsubproj { "lib" }\n+link { -lm }'),
     "tree/app/src/app.cpp": '@import "lib/lib.h"\nint app;\n',
 }
 MADE = ("x64/**/*.o", "out/lib/**/*", "qrexsource/**/*.cpp", "qrexsource/**/*.h")

@@ -44,7 +44,8 @@ def test_messages_point_at_the_source(workspace):
 
 
 @in_workspace({**workspace_of("app"), "tree/app/src/x.cpp": 'extern "C" int V();\nint main() { return V(); }\n',
-               "tree/app/src/app.qrpj": project("Application", "app", '"src" { "x.cpp" }', '+link { "vendor/$(Platform).a" }')}, "g++")
+               "tree/app/src/app.qrpj": project("Application", "app", '"src" { "x.cpp" }', '+link { "vendor/$(Platform).a" }')},
+              "g++")
 def test_a_library_that_switches_name_is_linked_anew(workspace):
     for number in (10, 20):
         workspace.write("one.c", f"int V() {{ return {number}; }}\n")

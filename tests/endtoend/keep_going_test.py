@@ -1,7 +1,8 @@
 #!/usr/bin/env python3
 """A run that keeps going behind errors of translations: all are told, and what they do not touch is made."""
 
-from workspace_fixture import Workspace, comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
+from workspace_fixture import (Workspace, comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins,
+                               workspace_of)
 
 PROJECTS = {  # kind, subprojects, public headers, sources
     "core": ("Static Library", "", ("good.h", "bad.h", "over.h"), ("core.cpp", "fine.cpp")),

@@ -6,7 +6,7 @@ import re
 from pathlib import Path
 
 from runtime_fixture import PLAIN, link, write_library
-from workspace_fixture import ROOT, Workspace, equal, holds, need, project, run_tests, workspace_of
+from workspace_fixture import ROOT, RUNTIME, Workspace, equal, holds, need, project, run_tests, workspace_of
 
 PAGE = ROOT / "docs/language.md"
 PROJECT = project("Console Application", "language", '"src" { "*.h" "*.cpp" }', 'subproj { "Vesk/vxObject" }')
@@ -73,8 +73,9 @@ class Examples:
 
 
 def translate(binary, examples):
-    settings = f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true\n' + KEYS + examples.settings
-    workspace = Workspace(binary, {**workspace_of("Vesk/vxObject", "language", settings=settings), "tree/language/src/language.qrpj": PROJECT,
+    settings = RUNTIME + "translateOnly = true\n" + KEYS + examples.settings
+    workspace = Workspace(binary, {**workspace_of("Vesk/vxObject", "language", settings=settings),
+                                   "tree/language/src/language.qrpj": PROJECT,
                                    "tree/language/src/language.cpp": HEAD + "vxDefineTarget(language, 2)\n"})
     for name, text in examples.sources.items():
         workspace.write("tree/language/src/" + name, text)

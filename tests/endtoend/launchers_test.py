@@ -15,7 +15,8 @@ def files():
     sources = ["app.cpp"] + [f"part{number}.cpp" for number in range(1, COUNT)]
     listed = " ".join(f'"{source}"' for source in sources)
     made = {**workspace_of("app", settings="writeTokenEquivalent = false\n"),
-            "tree/app/src/app.qrpj": project("Console Application", "app", f'"src" {{ "app.h" {listed} }}', "+cpp { -MMD '-DNAME=\"two words\"' }"),
+            "tree/app/src/app.qrpj": project("Console Application", "app", f'"src" {{ "app.h" {listed} }}',
+                                             "+cpp { -MMD '-DNAME=\"two words\"' }"),
             "tree/app/src/app.h": "inline const char* name() { return NAME; }\n",
             "tree/app/src/app.cpp": '@import "app.h"\n#include <cstdio>\nint main() { std::puts(name()); }\n'}
     made.update({f"tree/app/src/part{number}.cpp": f'int part{number}() {{ return {number}; }}\n'

@@ -118,7 +118,8 @@ class Client:
         return {"textDocument": {"uri": uri_of(self.path(name))}, "position": self.position(name, at + within)}
 
     def tell_change(self, name, **change):
-        self.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(self.path(name)), "version": 2}, "contentChanges": [change]})
+        document = {"uri": uri_of(self.path(name)), "version": 2}
+        self.tell("textDocument/didChange", {"textDocument": document, "contentChanges": [change]})
 
     def change(self, name, begin, end, new):
         """Replaces a part of a text, as an editor tells it."""

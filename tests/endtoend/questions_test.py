@@ -9,7 +9,7 @@ import sys
 import time
 from pathlib import Path
 
-from workspace_fixture import ROOT, data, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
+from workspace_fixture import ROOT, RUNTIME, data, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 APP_FILES = '"src" { "a.h" "\u00e4 b.h" "b.cpp" "c.cpp" "app.cpp" }'
 FILES = {
@@ -61,10 +61,11 @@ def test_graphs(workspace):
 
 
 MODELS = {
-    **FILES, **workspace_of("core", "app", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\n'),
+    **FILES, **workspace_of("core", "app", settings=RUNTIME + 'workspaces += { "Vesk/vxObject" }\n'),
     "tree/app/src/app.qrpj": project("Console Application", "app", APP_FILES, 'subproj { "core" "Vesk/vxObject" }'),
-    "tree/app/src/a.h": '@import "Vesk/vxObject/IObject.h"\nnamespace n {\n$enum Kind { low, high };\n$struct Plain { $Kind kind; };\n'
-                        '$variant Either { Kind; int32; };\n}\n$model Inner { n::Plain plain; };\n',
+    "tree/app/src/a.h": '@import "Vesk/vxObject/IObject.h"\nnamespace n {\n$enum Kind { low, high };\n'
+                        '$struct Plain { $Kind kind; };\n$variant Either { Kind; int32; };\n}\n'
+                        '$model Inner { n::Plain plain; };\n',
     "tree/app/src/app.cpp": '@import "a.h"\n$model Note\n{\n  xmap<int32,Inner> parts;\n  n::Either either;\n'
                             '  $dropped { int32 old; }\n  $schema { 1: +old 2: -old +parts +either }\n};\n'
                             '$class Page : model Note { };\nint main() { return 0; }\n',
@@ -153,7 +154,8 @@ def test_why_foretells_the_build(workspace):
         log = workspace.run("all.qrex", *lines)
         translated = {line[2:] for line in log.splitlines() if line.startswith("* ")}
         objects = workspace.changed(before, "x64/**/*.o")
-        compiled = {source for source in SOURCES if f"x64/Debug/{source.split('/')[0]}/{Path(source).stem}.o" in objects and source.endswith(".cpp")}
+        compiled = {source for source in SOURCES if source.endswith(".cpp")
+                    and f"x64/Debug/{source.split('/')[0]}/{Path(source).stem}.o" in objects}
         for source, answer in foretold.items():
             assert answer.startswith(f"tree/{source} would be translated") == (Path(source).name in translated), f"{name}: {answer}{log}"
             assert ("compiled" in answer) == (source in compiled), f"{name}: {answer}{log}"

@@ -10,7 +10,8 @@ import time
 from pathlib import Path
 
 from browser_fixture import Browser, with_selenium
-from workspace_fixture import ROOT, comparable, data, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
+from workspace_fixture import (RUNTIME, comparable, data, equal, holds, in_workspace, lacks, project, run_tests, stand_ins,
+                               workspace_of)
 
 with_selenium()
 
@@ -208,7 +209,7 @@ def fits(browser, width, *tabs):
 
 MODELS = data("report/models.h")
 DECLARING = {
-    **workspace_of("app", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n'),
+    **workspace_of("app", settings=RUNTIME + 'workspaces += { "Vesk/vxObject" }\ntranslateOnly = true\n'),
     "tree/app/src/app.qrpj": project("Console Application", "app", '"a.h" "b.h" "<" { "b>.h" } "src" { "app.cpp" "m*.cpp" }',
                                      'subproj { "Vesk/vxObject" }'),
     "tree/app/a.h": '@import "app/</b>.h"\n' + MODELS, "tree/app/b.h": '@import "app/a.h"\n$struct Held { $Point at; };\n',

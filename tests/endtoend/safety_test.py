@@ -31,7 +31,7 @@ def test_names_do_not_run(binary):
             f"tree {name}/.qrwsroot": "",
             f"tree {name}/all.qrws": f'"all" {{ "{name}" }}\n',
             f"tree {name}/{name}/src/a.cpp": "int main() { return 0; }\n",
-            f"tree {name}/{name}/src/{name}.qrpj": FILES[PROJECT].replace('"app"', f'"{name}"').replace("Debug|x64", f"{name}|{name}"),
+            f"tree {name}/{name}/src/{name}.qrpj": FILES[PROJECT].replace("app", name).replace("Debug|x64", f"{name}|{name}"),
         }
         with Workspace(binary, files) as workspace:
             holds(workspace.run("all.qrex"), "\nCompleted..")

@@ -3,7 +3,7 @@
 
 import shutil
 
-from workspace_fixture import ROOT, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
+from workspace_fixture import RUNTIME, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 LOCK = "kept/all.schemas"
 HEAD = "# Releases of models whose archives can be read. Kept by Qrex, to be committed.\n"
@@ -38,7 +38,7 @@ app n::Part model = kinds:xvector<n::Kind>
 """
 KEY = f'schemaLock = "{LOCK}"\n'
 FILES = {
-    **workspace_of("app", "Vesk/vxObject", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\ntranslateOnly = true\n'),
+    **workspace_of("app", "Vesk/vxObject", settings=RUNTIME + "translateOnly = true\n"),
     "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "kinds.h" "note.h" "other.h" "other.cpp" "app.cpp" }',
                                      'subproj { "Vesk/vxObject" }'),
     "tree/app/src/kinds.h": IMPORT + KINDS,

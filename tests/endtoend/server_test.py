@@ -8,7 +8,7 @@ from pathlib import Path
 from random import Random
 
 from lsp_fixture import Client, server_beside, uri_of
-from workspace_fixture import ROOT, Skipped, Workspace, data, equal, holds, lacks, need, project, run_tests, workspace_of
+from workspace_fixture import RUNTIME, Skipped, Workspace, data, equal, holds, lacks, need, project, run_tests, workspace_of
 
 HEADER = data("server/shape.h")
 MAIN = data("server/app.cpp")
@@ -16,8 +16,8 @@ CODES = "namespace codes\n{\n$enum+ Code { fine, lost };\n}\n"
 PLAIN = "tree/plain/src/plain.qrpj"
 SHAPE, APP, PROJECT = "tree/app/src/shape.h", "tree/app/src/app.cpp", "tree/app/src/app.qrpj"
 FILES = {
-    **workspace_of("Vesk/vxObject", "codes", "plain", "app", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true '
-                                                                      'compilableText = true modernCpp = true\n'),
+    **workspace_of("Vesk/vxObject", "codes", "plain", "app",
+                   settings=RUNTIME + "translateOnly = true compilableText = true modernCpp = true\n"),
     SHAPE: HEADER, APP: MAIN, "tree/codes/api/codes.h": CODES, "tree/app/src/beside.h": "$enum+ Other { one };\n",
     "tree/codes/src/codes.qrpj": project("Static Library", "codes", '"api" { "codes.h" }'),
     PLAIN: project("Static Library", "plain", '"api" { "plain.h" }').replace("qrex\n", ""),

@@ -41,7 +41,8 @@ manifest=${{text##* \\"}}; manifest=${{manifest%%\\"*}}
 
 def described(kind, name, target, files, link="", more=""):
     """A project; what it makes is named by its switches."""
-    switches = f'+cpp {{ /nologo /W3 /GS- /Zl /D "LEVEL=7" }}\n+link {{ /OUT:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/{target}" {link} }}\n{more}'
+    out = f'/OUT:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/{target}"'
+    switches = f'+cpp {{ /nologo /W3 /GS- /Zl /D "LEVEL=7" }}\n+link {{ {out} {link} }}\n{more}'
     return project(kind, name, files, switches).replace("x64", "Win64")
 
 
@@ -62,7 +63,8 @@ PATH("Win64") = { "tools" "/usr/bin" "/bin" } INCLUDE("Win64") = { "inc" } LIB("
     "tree/base/src/base.cpp": '@import "StdAfx.h"\n',
     "tree/base/src/twice.asm": ".code\nTwice PROC\n    lea rax, [rcx+rcx]\n    ret\nTwice ENDP\nEND\n",
     "tree/shape/src/shape.qrpj": described(
-        "Dynamic-Link Library", "shape", "shape.dll", '"shape.h" "src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "shape.cpp" "shape.rc" }',
+        "Dynamic-Link Library", "shape", "shape.dll",
+        '"shape.h" "src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "shape.cpp" "shape.rc" }',
         f'/DLL /NOENTRY /NODEFAULTLIB /IMPLIB:"$(EXPORT_LIB)/$(PLATFORM)/$(CONFIG)/shape.lib" {manifest("shape.dll")}'),
     "tree/shape/shape.h": "#ifdef SHAPE\n#define API __declspec(dllexport)\n#else\n#define API __declspec(dllimport)\n#endif\n"
                           "API int Area(int a, int b);\n",
@@ -70,8 +72,9 @@ PATH("Win64") = { "tools" "/usr/bin" "/bin" } INCLUDE("Win64") = { "inc" } LIB("
     "tree/shape/src/StdAfx.cpp": '@import "StdAfx.h"\n',
     "tree/shape/src/shape.cpp": '@import "StdAfx.h"\nint Area(int a, int b)\n{\n    return a * b;\n}\n',
     "tree/shape/src/shape.rc": "1 VERSIONINFO\nFILEVERSION 1,2,3,4\nBEGIN\nEND\n",
-    "tree/app/src/app.qrpj": described("Console Application", "app", "app.exe", '"src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "app.cpp" }',
-                                       f'/ENTRY:Start /SUBSYSTEM:CONSOLE /NODEFAULTLIB {manifest("app.exe")}', 'subproj { "base" "shape" }'),
+    "tree/app/src/app.qrpj": described(
+        "Console Application", "app", "app.exe", '"src" { "StdAfx.h" "StdAfx.cpp" : +cpp { /Yc } "app.cpp" }',
+        f'/ENTRY:Start /SUBSYSTEM:CONSOLE /NODEFAULTLIB {manifest("app.exe")}', 'subproj { "base" "shape" }'),
     "tree/app/src/StdAfx.h": '@import "base/level.h"\n@import "shape/shape.h"\n',
     "tree/app/src/StdAfx.cpp": '@import "StdAfx.h"\n',
     "tree/app/src/app.cpp": """@import "StdAfx.h"

@@ -28,6 +28,9 @@ INCLUDE("x64") = { "/usr/include" }
 LIB("x64") = { "/usr/lib" }
 """
 
+# A line of settings: the runtime is found.
+RUNTIME = f'virtualTree += {{ "{ROOT / "runtime"}" }}\n'
+
 # Compilers that keep what they made, where they are installed: no script compiles what another one has compiled.
 CACHE = "/usr/lib/ccache"
 if os.path.isdir(CACHE):
@@ -51,7 +54,8 @@ def stand_ins(compiling="", linking="", archiving=""):
     """Tools of the gcc family: an object is its source, a library or program what went into it. What runs ahead of a compilation
     has $object and $source, ahead of the others $target."""
     return {"tools/gcc-4": f"""#!/bin/bash
-text=$(tr -d '\\r' < "${{2#@}}"); object=${{text#*-o \\"}}; object=${{object%%\\"*}}; source=${{text##* \\"}}; source=${{source%\\"*}}
+text=$(tr -d '\\r' < "${{2#@}}"); object=${{text#*-o \\"}}; object=${{object%%\\"*}}
+source=${{text##* \\"}}; source=${{source%\\"*}}
 {compiling}
 cat "$source" > "$object"
 """, "tools/ar": f"""#!/bin/sh
@@ -196,9 +200,9 @@ def indented(page):
 
 def install(binary, prefix):
     """The tool and its runtime, below a prefix."""
+    command = ["cmake", "--install", os.path.dirname(os.path.abspath(binary)), "--prefix", prefix, "--component"]
     for component in ("tool", "runtime"):
-        subprocess.run(["cmake", "--install", os.path.dirname(os.path.abspath(binary)), "--prefix", prefix, "--component", component],
-                       check=True, stdout=subprocess.DEVNULL)
+        subprocess.run([*command, component], check=True, stdout=subprocess.DEVNULL)
 
 
 def need(*tools):

@@ -114,7 +114,8 @@ class Kind:
             self.require(self.run(self.start, earlier))
             self.before = outputs(self.start)
             time.sleep(0.02)
-            for name, text in (("zoo.h", "int added;\n"), ("big.h", "$struct+ Last { $int32 a; };\n"), ("notes.txt", "the end\n")):
+            edits = {"zoo.h": "int added;\n", "big.h": "$struct+ Last { $int32 a; };\n", "notes.txt": "the end\n"}
+            for name, text in edits.items():
                 with open(self.start / "tree/zoo" / name, "a") as file:
                     file.write(text)
         else:

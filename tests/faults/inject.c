@@ -114,7 +114,8 @@ static int goes_wrong(enum Call call) {
     errno = error_number;                                                \
     return result;                                                       \
   }
-#define FAILING(type, name, call, result, parameters, arguments) SHORTENED(type, name, call, result, parameters, arguments, arguments)
+#define FAILING(type, name, call, result, parameters, arguments) \
+  SHORTENED(type, name, call, result, parameters, arguments, arguments)
 
 FAILING(int, stat, STAT, -1, (const char* path, struct stat* out), (path, out))
 FAILING(int, stat64, STAT, -1, (const char* path, struct stat64* out), (path, out))
@@ -125,7 +126,8 @@ FAILING(int, rename, RENAME, -1, (const char* from, const char* to), (from, to))
 FAILING(int, unlink, UNLINK, -1, (const char* path), (path))
 FAILING(int, mkdir, MKDIR, -1, (const char* path, mode_t mode), (path, mode))
 FAILING(int, chmod, CHMOD, -1, (const char* path, mode_t mode), (path, mode))
-FAILING(int, utimensat, UTIME, -1, (int folder, const char* path, const struct timespec times[2], int flags), (folder, path, times, flags))
+FAILING(int, utimensat, UTIME, -1, (int folder, const char* path, const struct timespec times[2], int flags),
+        (folder, path, times, flags))
 FAILING(DIR*, opendir, OPENDIR, NULL, (const char* path), (path))
 FAILING(struct dirent*, readdir, READDIR, NULL, (DIR* folder), (folder))
 FAILING(FILE*, fopen, FOPEN, NULL, (const char* path, const char* mode), (path, mode))

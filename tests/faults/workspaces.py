@@ -16,8 +16,8 @@ def run(binary, folder, *arguments, **environment):
 
 def build_library(folder, name):
     """A library to be preloaded, of a source beside this one."""
-    library = folder / f"{name}.so"
-    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, Path(__file__).resolve().parent / f"{name}.c", "-ldl"], check=True)
+    library, source = folder / f"{name}.so", Path(__file__).resolve().parent / f"{name}.c"
+    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, source, "-ldl"], check=True)
     return str(library)
 
 
