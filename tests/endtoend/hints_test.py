@@ -30,7 +30,8 @@ def hints_of(binary, changes, *arguments):
             if terminal:
                 output = on_terminal(command, workspace.folder, TERM="dumb")[0]
             else:
-                output = subprocess.run(command, cwd=workspace.folder, stdout=subprocess.PIPE, text=True).stdout
+                done = subprocess.run(command, cwd=workspace.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, text=True)
+                output = done.stdout
             outputs.append(output.replace(str(workspace.folder), "FOLDER"))
     lacks(outputs[1], "hint: ")
     equal(*map(comparable, outputs))
