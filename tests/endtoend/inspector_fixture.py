@@ -1,4 +1,4 @@
-"""A program that can be looked into (tests/endtoend/inspector), and a page of it without a browser."""
+"""A program that can be looked into (data/inspector), and a page of it without a browser."""
 
 import base64
 import json
@@ -10,9 +10,8 @@ import subprocess
 import time
 
 from runtime_fixture import has_header, link, translated_shop, write_library
-from workspace_fixture import ROOT, Skipped, need
+from workspace_fixture import Skipped, data, need
 
-SOURCES = ROOT / "tests/endtoend/inspector"
 PLAIN = "g++ -std=c++17 -Wall -Werror -fPIC -fno-gnu-unique -pthread"
 ADDRESSES = "g++ -std=c++17 -g1 -O1 -fsanitize=address,undefined -fno-sanitize-recover=undefined -fno-sanitize=bool,alignment -pthread"
 THREADS = "g++ -std=c++17 -g1 -O1 -fsanitize=thread -Wno-tsan -pthread"
@@ -23,7 +22,7 @@ def built(binary, compiler=PLAIN):
     need("g++", "setarch")
     if not has_header("boost/beast.hpp"):
         raise Skipped("boost/beast.hpp")
-    workspace = translated_shop(binary, "", (SOURCES / "shop.cpp").read_text(), (SOURCES / "shop.h").read_text())
+    workspace = translated_shop(binary, "", data("inspector/shop.cpp"), data("inspector/shop.h"))
     write_library(workspace)
     link(workspace, compiler, ["qrexsource/x64/Debug/app/src/app.cpp"], "app")
     return workspace
