@@ -67,6 +67,22 @@ def test_what_an_edit_makes_stale():
         expect(text.count('\n* ') == 7, text)
 
 
+def test_a_failed_translation_keeps_its_imports():
+    # b.h fails ahead of its import of c.h, and c.h changed as well: mending the former must not hide the latter
+    write_tree({'tree/app/b.h': '@import "a.h"\n@import "c.h"\nint b;\n'})
+    run()
+    good = read('tree/app/a.h')
+    good_time = os.stat('tree/app/a.h').st_mtime_ns
+    edit('tree/app/c.h')
+    edit('tree/app/a.h', '$bad\n')
+    run(status=1)
+    write('tree/app/a.h', good)
+    os.utime('tree/app/a.h', ns=(good_time, good_time))
+    text = run('main.qrex', 'diagnostics=true')
+    holds(text, '* b.h\n', '* x.cpp\n', '* y.cpp\n')
+    lacks(run('main.qrex', 'diagnostics=true'), '\n* ')
+
+
 def test_clean_compile_show():
     write_tree()
     run()
