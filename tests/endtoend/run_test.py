@@ -67,6 +67,22 @@ def test_what_an_edit_makes_stale():
         expect(text.count('\n* ') == 7, text)
 
 
+def test_a_main_source_that_is_compiled_alone_registers_all():
+    write_tree()
+    compiled = ['main.qrex', 'mode=compile', '$COMPILE_FILE_PATH = "tree/app/src/app.cpp"']
+    run(*compiled)
+    expect(b'_Register_x0' in read(TRANSLATED + 'src/app.cpp'), 'x.cpp was never translated')
+    expect(not os.path.exists(TRANSLATED + 'src/x.cpp'), 'nor is it written')
+    holds(run('main.qrex', 'diagnostics=true'), 'Writing: ' + TRANSLATED + 'src/x.cpp')
+    alone = read(TRANSLATED + 'src/app.cpp')
+    shutil.rmtree('qrexsource')
+    run()
+    expect(read(TRANSLATED + 'src/app.cpp') == alone, 'as a whole build writes it')
+    edit('tree/app/src/y.cpp', '$bad\n')
+    os.remove(DEPENDENCIES)
+    holds(run(*compiled, status=1), "tree/app/src/y.cpp(1) : error : '$bad' is not a valid directive")
+
+
 def test_a_failed_translation_keeps_its_imports():
     # b.h fails ahead of its import of c.h, and c.h changed as well: mending the former must not hide the latter
     write_tree({'tree/app/b.h': '@import "a.h"\n@import "c.h"\nint b;\n'})
