@@ -67,6 +67,22 @@ def test_what_an_edit_makes_stale():
         expect(text.count('\n* ') == 7, text)
 
 
+def test_nothing_is_lost_when_an_error_ends_the_run():
+    write_tree()
+    run()
+    edit('tree/app/src/x.cpp', '@import "app/b.h"\n@import "app/a.h"\n$init { }\n$init { }\n')
+    edit('tree/app/src/y.cpp', 'int y;\n$bad\n')
+    text = run(status=1)
+    holds(text, "\ntree/app/src/y.cpp(2) : error : '$bad' is not a valid directive")
+    lacks(text, '\napp...')
+    lacks(text, 'Completed')
+    main_before = read(TRANSLATED + 'src/app.cpp')
+    edit('tree/app/src/y.cpp', 'int y;\n')
+    text = run('main.qrex', 'diagnostics=true')
+    expect(re.findall(r'^Writing: .*/(.*)$', text, re.M) == ['y.cpp', 'app.cpp'], text)  # x.cpp was finished before
+    expect(b'_Register_x1' in read(TRANSLATED + 'src/app.cpp') and b'_Register_x1' not in main_before, 'registration')
+
+
 def test_a_main_source_that_is_compiled_alone_registers_all():
     write_tree()
     compiled = ['main.qrex', 'mode=compile', '$COMPILE_FILE_PATH = "tree/app/src/app.cpp"']

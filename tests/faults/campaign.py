@@ -25,12 +25,11 @@ import tempfile
 import time
 from pathlib import Path
 
-import layout
-import stamps
-
 HERE = Path(__file__).resolve().parent
 sys.path.insert(0, str(HERE.parent / "endtoend"))
+import layout  # noqa: E402
 import signals  # noqa: E402
+import stamps  # noqa: E402
 import workspaces  # noqa: E402
 from workspace_fixture import Workspace  # noqa: E402
 
