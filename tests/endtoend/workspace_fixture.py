@@ -65,7 +65,7 @@ cat $(tr -d '"\\r' < "${{3#@}}") > "$target"
 """, "tools/g++": f"""#!/bin/sh
 text=$(tr -d '"\\r' < "${{1#@}}"); set -- $text; target=$2; shift 2
 {linking}
-{{ echo "$text"; for word; do case $word in -*|*ORIGIN*) ;; *) cat "$word" || exit 1;; esac; done; }} > "$target"
+{{ echo "$text"; for word; do case $word in -*|*ORIGIN*) ;; *) [ -f "$word" ] && cat "$word" || exit 1;; esac; done; }} > "$target"
 """}
 
 
