@@ -1,26 +1,28 @@
 """The workspaces of the campaign, with scripts that stand for compilers and linkers: an object is its source, a library or
-program is what went into it."""
+program is what went into it; and how the tool runs in them."""
+
+import os
+import subprocess
+from pathlib import Path
 
 from signals import PAUSE
-from workspace_fixture import SETTINGS
+from workspace_fixture import SETTINGS, stand_ins
+
+
+def run(binary, folder, *arguments, **environment):
+    return subprocess.run([binary, *arguments], cwd=folder, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
+                          stderr=subprocess.STDOUT, timeout=60, env={**os.environ, **environment})
+
+
+def build_library(folder, name):
+    """A library to be preloaded, of a source beside this one."""
+    library, source = folder / f"{name}.so", Path(__file__).resolve().parent / f"{name}.c"
+    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, source, "-ldl"], check=True)
+    return str(library)
+
 
 # --- The gcc family
 
-COMPILER = """#!/bin/sh
-eval set -- $(tr -d '\\r' < "${2#@}")
-while [ $# -gt 1 ]; do [ "$1" = -o ] && out=$2; shift; done
-""" + PAUSE + """cp "$1" "$out" && chmod u+w "$out"
-"""
-LIBRARIAN = """#!/bin/sh
-eval set -- "$2" $(tr -d '\\r' < "${3#@}")
-out=$1; shift
-""" + PAUSE + """cat "$@" > "$out"
-"""
-LINKER = """#!/bin/sh
-eval set -- $(tr -d '\\r' < "${1#@}")
-while [ $# -gt 0 ]; do case "$1" in -o) out=$2; shift;; -Xlinker) shift;; -*) ;; *) in="$in $1";; esac; shift; done
-""" + PAUSE + """cat $in > "$out"
-"""
 CLASSES = "".join(f"$struct+ S{i} {{ $int32 a; $int32 b; $int32 c; }};\n" for i in range(700))  # above 256 KiB of text
 
 
@@ -32,6 +34,7 @@ def project(target, files, extra=""):
 def gcc():
     library = project("Static Library", '{ "zoo.h" "big.h" "notes.txt" "src" { "zoo.cpp" "big.cpp" } }')
     program = project("Console Application", '{ "src" { "app.cpp" "more.cpp" } }', 'subproj { "zoo" }\n')
+    tools = stand_ins("out=$object\n" + PAUSE, *["out=$target\n" + PAUSE] * 2)
     return {
         "all.qrex": SETTINGS + 'makeExportedHeaderFilesReadOnly = true\nmakeTranslatedFilesReadOnly = true\n',
         "tree/.qrwsroot": "",
@@ -50,10 +53,8 @@ def gcc():
         "tree/app/src/app.cpp": '@import "zoo/zoo.h"\n$init { }\nint main() { return legs; }\n',
         "tree/app/src/more.cpp": "int more;\n",
         "tools/lead": '#!/bin/sh\n"$@"\n',
-        "tools/gcc-4": COMPILER,
-        "tools/gcc": COMPILER,  # where the other is not found because of a fault
-        "tools/ar": LIBRARIAN,
-        "tools/g++": LINKER,
+        **tools,
+        "tools/gcc": tools["tools/gcc-4"],  # where the other is not found because of a fault
     }
 
 
