@@ -9,7 +9,7 @@ import sys
 import tempfile
 import time
 
-from workspace_fixture import run_tests
+from workspace_fixture import DRIVE, run_tests
 
 BINARY = os.path.abspath(sys.argv[1])
 CONFIG = '''virtualTree = { "tree" }
@@ -73,6 +73,8 @@ def run(*arguments, status=0):
     """Runs the tool; what it printed."""
     done = subprocess.run([BINARY, *(arguments or ['main.qrex'])], stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=60)
     text = done.stdout.decode(errors='replace')
+    if DRIVE:
+        text = text.replace('\r\n', '\n').replace(DRIVE + '/', '/')
     assert done.returncode == status, f'status {done.returncode}, not {status}, of {arguments}:\n{text}'
     return text
 

@@ -33,6 +33,9 @@ CACHE = "/usr/lib/ccache"
 if os.path.isdir(CACHE):
     os.environ.update(PATH=f"{CACHE}:{os.environ['PATH']}", CCACHE_BASEDIR=tempfile.gettempdir(), CCACHE_NOHASHDIR="1")
 
+# The drive that the tool of another system puts ahead of paths, where that is what runs (tests/windows).
+DRIVE = os.environ.get("QREX_DRIVE", "")
+
 # The words of `compiler`, in their order.
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 
@@ -108,9 +111,9 @@ class Workspace:
         """Runs the tool; its standard output. Fails on another exit status."""
         done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900,
                               env={**os.environ, **environment})
-        self.output = done.stdout
+        self.output = done.stdout.replace(f"{DRIVE}/", "/")
         assert done.returncode == status, f"status {done.returncode}, not {status}:\n{done.stdout}{done.stderr}"
-        return done.stdout
+        return self.output
 
     def shell(self, command, status=0, **environment):
         """Runs a shell command with the tool on PATH as `Qrex`; its output."""
@@ -118,7 +121,7 @@ class Workspace:
         done = subprocess.run(command, shell=True, cwd=self.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
                               text=True, timeout=900, env={**os.environ, "PATH": path, **environment})
         assert done.returncode == status, f"{command}: status {done.returncode}:\n{done.stdout}"
-        return done.stdout
+        return done.stdout.replace(f"{DRIVE}/", "/")
 
     def times(self, pattern):
         """Name to modification time, of the files that the pattern matches."""
