@@ -1,5 +1,5 @@
 #!/usr/bin/env python3
-"""Tools of this system for the Windows program: bridges.py BRIDGE COMMAND... runs a command, below which they can be called.
+"""Tools of this system for the Windows program: bridges.py BUILD_FOLDER COMMAND... runs a command, below which they can be called.
 
 Drive R: is a view of this system in which a bridge (bridge.cpp) stands for each program in the folders of PATH; `Qrex` beside
 this file runs the Windows program there. The bridges talk to the server here, which runs the programs."""
@@ -175,11 +175,29 @@ class Server:
                     os.unlink(path)
 
 
+# Ahead of what this system's program is installed with its own, the Windows program and what calls it.
+INSTALL = """include("{linux}/cmake_install.cmake")
+if(NOT CMAKE_INSTALL_COMPONENT OR CMAKE_INSTALL_COMPONENT STREQUAL "tool")
+  file(INSTALL DESTINATION "${{CMAKE_INSTALL_PREFIX}}/bin" TYPE PROGRAM FILES "{wrapper}" "{windows}/Qrex.exe")
+endif()
+"""
+
+
+def build_folder(folder, windows, linux):
+    """As the build folder of this system, as far as tests ask for that, but with the Windows program in its place."""
+    wrapper = Path(__file__).with_name("Qrex")
+    folder.mkdir()
+    (folder / "cmake_install.cmake").write_text(INSTALL.format(linux=linux, windows=windows, wrapper=wrapper))
+    for path in [wrapper, Path(windows) / "Qrex.exe", *(Path(linux) / name for name in ("built", "CPackConfig.cmake"))]:
+        (folder / path.name).symlink_to(path)
+    return folder / "Qrex"
+
+
 class Bridges:
     """A view, and the server; what runs below has them in its environment."""
 
-    def __init__(self, bridge):
-        self.bridge = bridge
+    def __init__(self, windows, linux):
+        self.windows, self.linux, self.bridge = windows, linux, windows / "bridge.exe"
 
     def __enter__(self):
         self.folder = Path(tempfile.mkdtemp(prefix="bridges-"))
@@ -187,14 +205,16 @@ class Bridges:
         drive = Path(os.environ["WINEPREFIX"]) / "dosdevices" / DRIVE.lower()
         drive.unlink(missing_ok=True)
         drive.symlink_to(self.folder / "view")
-        os.environ.update(QREX_BRIDGES=Server().address, QREX_BRIDGE=self.bridge, QREX_VIEW=str(self.folder / "view"), QREX_DRIVE=DRIVE)
+        self.program = build_folder(self.folder / "build", self.windows, self.linux)
+        os.environ.update(QREX_BRIDGES=Server().address, QREX_BRIDGE=str(self.bridge), QREX_VIEW=str(self.folder / "view"), QREX_DRIVE=DRIVE)
+        return self
 
     def __exit__(self, *_):
         shutil.rmtree(self.folder, ignore_errors=True)
 
 
 def main():
-    with Bridges(os.path.abspath(sys.argv[1])):
+    with Bridges(Path(sys.argv[1]).resolve(), Path(__file__).resolve().parents[2] / "build"):
         sys.exit(subprocess.run(sys.argv[2:]).returncode)
 
 

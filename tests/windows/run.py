@@ -180,19 +180,19 @@ def at_twos(count, play, labels):
     return count
 
 
-def play_test(label):
+def play_test(label, program):
     name, test = label.split(".")
-    text = text_of(run([sys.executable, str(ROOT / f"tests/endtoend/{name}_test.py"), WRAPPER, test]))
+    text = text_of(run([sys.executable, str(ROOT / f"tests/endtoend/{name}_test.py"), str(program), test]))
     told = re.search(r"(\d+) passed, 0 failed", text)
     if told and told[1] == "0":
         return text.split("\n")[0], None
     return None, None if told else text[-3000:]
 
 
-def scripts():
+def scripts(program):
     labels = [f"{script.stem.removesuffix('_test')}.{test}" for script in sorted((ROOT / "tests/endtoend").glob("*_test.py"))
               for test in tests_of(script)]
-    return at_twos(Count("end-to-end tests"), play_test, labels)
+    return at_twos(Count("end-to-end tests"), lambda label: play_test(label, program), labels)
 
 
 def cases(folder):
@@ -206,12 +206,13 @@ def cases(folder):
 def main():
     build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
     os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
-    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples,
-              compiled.runtime, lambda: builds(build), scripts]
-    if len(sys.argv) > 3 and sys.argv[3]:
-        groups.append(lambda: cases(Path(sys.argv[3]).resolve()))
+    folder = sys.argv[3] if len(sys.argv) > 3 else ""
     counts = []
-    with Bridges(build / "bridge.exe"):
+    with Bridges(build, Path(binary).parent) as bridges:
+        groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples, compiled.runtime,
+                  lambda: builds(build), lambda: scripts(bridges.program)]
+        if folder:
+            groups.append(lambda: cases(Path(folder).resolve()))
         for group in groups:
             begin = time.monotonic()
             counts.append(group())
