@@ -15,7 +15,7 @@ from pathlib import Path
 HERE = Path(__file__).resolve().parent
 ROOT = HERE.parents[1]
 sys.path.insert(0, str(ROOT / "tests/endtoend"))
-from workspace_fixture import Skipped, equal, run_tests  # noqa: E402
+from workspace_fixture import Skipped, equal, need, run_tests  # noqa: E402
 
 EXTENSION = ROOT / "editors/vscode"
 VIM = ROOT / "editors/vim"
@@ -24,25 +24,23 @@ DOCS = ROOT / "docs/editors.md"
 VIMS = {"nvim": ["nvim", "--clean", "--headless"], "vim": ["vim", "--clean", "-N", "-es"]}
 
 
-def need(*programs):
-    for program in programs:
-        if not shutil.which(program):
-            raise Skipped(program)
-
-
 def run(command, **options):
     done = subprocess.run(command, stdin=subprocess.DEVNULL, capture_output=True, text=True, timeout=120, **options)
     assert done.returncode == 0, f"{command}: status {done.returncode}\n{done.stdout[-4000:]}\n{done.stderr[-4000:]}"
     return done.stdout
 
 
+def vim(editor, *arguments, **options):
+    """What it prints, with our files."""
+    need(editor)
+    return run([*VIMS[editor], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after", *arguments], **options)
+
+
 def vim_answers(editor, folder, questions):
     """What check.vim answers in `folder` to questions [kind, file, line, column]."""
-    need(editor)
     answers = Path(folder) / "answers.json"
-    run([*VIMS[editor], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-         "--cmd", f"let g:questions = {json.dumps(questions)}", "--cmd", f"let g:answers = '{answers}'",
-         "-c", f"source {HERE}/vim/check.vim"], cwd=folder)
+    vim(editor, "--cmd", f"let g:questions = {json.dumps(questions)}", "--cmd", f"let g:answers = '{answers}'",
+        "-c", f"source {HERE}/vim/check.vim", cwd=folder)
     return json.loads(answers.read_text())
 
 
@@ -128,7 +126,6 @@ def session(language):
 
 
 def test_nvim_session(_binary):
-    need("nvim")
     steps = ["error wrong cpp", "mapped true v:lua.vim.lsp.omnifunc", "shown // $CLASS WRONG| cpp false", "follows // INT SECOND;|",
              "error wrong qrex", "clients 1", r'options {"arguments": ["config=\"Debug\""]} arguments []', "shown there 1",
              "elsewhere cpp 0"]
@@ -136,8 +133,7 @@ def test_nvim_session(_binary):
         with session("lua") as (_, options):
             if newer:
                 options["env"]["QREX_NEWER"] = newer
-            output = run([*VIMS["nvim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-                          "-c", f"luafile {HERE}/vim/session.lua"], **options).splitlines()
+            output = vim("nvim", "-c", f"luafile {HERE}/vim/session.lua", **options).splitlines()
         equal([line for line in output if not line.startswith("vim.lsp.start")], steps)
         equal([line for line in output if line.startswith("vim.lsp.start")], ["vim.lsp.start qrex w"] * 2 if newer else [])
 
@@ -155,19 +151,16 @@ def test_nvim_tour(binary):
         tour.write_text(tour.read_text().replace("../../runtime", str(ROOT / "runtime")))
         (work.parent / "bin/qrex-lsp").unlink()
         (work.parent / "bin/qrex-lsp").symlink_to(server)
-        output = run([*VIMS["nvim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-                      "-c", f"luafile {HERE}/vim/tour.lua"], **options).splitlines()
+        output = vim("nvim", "-c", f"luafile {HERE}/vim/tour.lua", **options).splitlines()
     equal(output, ["error: $dep flaot64 subtotal = { subtotal = pieces * price; };", "completes: Getpieces",
                    'leads to: order.h int32 pieces : [ unit("piece"), 1 ];', "renamed: orders1::Order first_release;"])
 
 
 def test_vim_session(_binary):
-    need("vim")
     if not Path("/usr/share/vim/vimfiles/pack/dist-bundle/opt/ale").is_dir():
         raise Skipped("vim-ale")
     with session("vim") as (folder, options):
-        run([*VIMS["vim"], "--cmd", f"set runtimepath^={VIM} runtimepath+={VIM}/after",
-             "-c", f"source {HERE}/vim/session_ale.vim"], **options)
+        vim("vim", "-c", f"source {HERE}/vim/session_ale.vim", **options)
         equal((folder / "errors.txt").read_text().splitlines(), ["wrong cpp", "wrong qrex"])
 
 
@@ -220,34 +213,17 @@ def words_of_tool():
             "<<": table("translator/reader/qualifiers.cpp", r'^      \{"(\w+)", &Q::')}
 
 
-def test_all_words_have_colours_in_vim(_binary):
-    groups = {"@": r"qrex(?!Predefined|Operator)\w+", "@=": "qrexPredefined", "$": r"qrex(?!Member|Heading)\w+", "": "qrexKey",
-              "<<": "qrexQualifier"}
-    forms = {"@": "@%s", "@=": "@%s", "$": "$%s ", "": "%s = 1", "<<": "$class A <<%s>> { };"}
-    files, expected = {"a.cpp": [], "a.qrex": []}, []
-    for kind, words in words_of_tool().items():
-        name = "a.qrex" if kind == "" else "a.cpp"
-        for word in sorted(words):
-            files[name].append(forms[kind] % word)
-            expected.append((kind, word, ["group", name, len(files[name]), forms[kind].index("%") + 1]))
-    with tempfile.TemporaryDirectory() as folder:
-        for name, lines in files.items():
-            # Each in a line of its own: what is open at its end must not reach the next.
-            Path(folder, name).write_text("\n".join(line + (" ;}" if line.startswith("$") else "") for line in lines) + "\n")
-        answers = vim_answers("vim", folder, [question for _, _, question in expected])
-    wrong = [f"{kind}{word}: {answer}" for (kind, word, _), answer in zip(expected, answers)
-             if not re.fullmatch(groups[kind], answer)]
-    assert not wrong, "\n".join(wrong)
-
-
 def test_all_words_are_in_the_grammars(_binary):
     rules = {"@": ("macros", "definition variable loop directive python"), "@=": ("macros", "predefined"), "": ("qrex", "key"),
              "$": ("cpp", "heading enumeration calculated words warning"), "<<": ("cpp", "qualifiers")}
     missing = []
-    kate = set(re.findall(r"[A-Za-z_]\w*", (ROOT / "editors/kate/qrex.xml").read_text()))
+    texts = {"kate": [ROOT / "editors/kate/qrex.xml"], "vim": [*VIM.glob("syntax/*.vim"), VIM / "after/syntax/c.vim"]}
+    known_there = {editor: set(re.findall(r"[A-Za-z_]\w*", " ".join(path.read_text() for path in paths)))
+                   for editor, paths in texts.items()}
     for kind, words in words_of_tool().items():
-        if kind in ("@", "@=", ""):
-            missing += [f"kate: {kind}{word}" for word in words - kate]
+        for editor, known in known_there.items():
+            if editor == "vim" or kind in ("@", "@=", ""):
+                missing += [f"{editor}: {kind}{word}" for word in words - known]
         grammar, names = rules[kind]
         repository = json.loads((EXTENSION / f"syntaxes/{grammar}.tmLanguage.json").read_text())["repository"]
         known = set(re.findall(r"[A-Za-z_]\w*", json.dumps([repository[name] for name in names.split()])))

@@ -4,7 +4,7 @@
 import re
 import xml.etree.ElementTree as XmlTree
 
-from workspace_fixture import CACHE, ROOT, Workspace, equal, holds, lacks, need, run_tests
+from workspace_fixture import CACHE, ROOT, Workspace, data, equal, holds, lacks, need, run_tests
 
 PRINTERS = ROOT / "runtime/debug/vesk_gdb.py"
 NATVIS = ROOT / "runtime/debug/vesk.natvis"
@@ -22,16 +22,7 @@ def gdb(workspace, program, *commands, options=f"-x {PRINTERS}"):
     return output
 
 
-HEADER = """@import "Vesk/vxObject/IObject.h"
-namespace more
-{
-$interface+ INamed : vesk::IObject { string8 Name() const; };
-$mixin Counted { $int32 counter; $dep int32 twice = { twice = counter * 2; }; $cache int32 plus(int32 n) const { return counter + n; } };
-$class+ Cat isa INamed : model { string8 hue; } mixin [ Counted ] { public: vesk::string8 Name() const { return "cat"; } };
-$enum+ class Refined { One = 1, default Two = 20 };
-$variant+ Value { *float64; int32; string8; *{ string8 s; } big; *int32 num; void nothing; };
-}
-"""
+HEADER = data("debug/more.h")
 LONG = "a text that has no room in the string itself"
 # Variables, with what gdb prints of them.
 VALUES = [("numbers", "vesk::DynArray<int32> numbers{1, 2}", "vesk::DynArray of length 2 = {1, 2}"),

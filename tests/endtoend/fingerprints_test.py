@@ -5,27 +5,16 @@ import os
 import time
 from pathlib import Path
 
-from workspace_fixture import SETTINGS, equal, in_workspace, run_tests
+from workspace_fixture import equal, in_workspace, project, run_tests, stand_ins, workspace_of
 
-# An object tells its command and source, a library or program what went into it.
-COMPILER = """#!/bin/sh
-text=$(tr -d '\\r' < "${2#@}"); object=${text#*-o \\"}; object=${object%%\\"*}; source=${text##* \\"}; source=${source%\\"}
-{ echo "$(basename $0) $text"; cat "$source"; } > "$object"
-"""
-LIBRARIAN = '#!/bin/sh\ncat $(tr -d \'"\\r\' < "${3#@}") > "$2"\n'
-LINKER = """#!/bin/sh
-text=$(tr -d '"\\r' < "${1#@}"); set -- $text; target=$2; shift 2
-{ echo "$text"; for word; do [ ! -f "$word" ] || cat "$word"; done; } > "$target"
-"""
-PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\n+cpp { %s }\n%s\nqrex\n{ %s }\n'
+TOOLS = stand_ins()
 FILES = {
-    "all.qrex": SETTINGS + "fingerprints = true\nwriteTokenEquivalent = false\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "lib" "app" }\n',
-    "tools/gcc-4": COMPILER, "tools/clang": COMPILER, "tools/ar": LIBRARIAN, "tools/g++": LINKER, "tools/clang++": LINKER,
-    "tree/lib/src/lib.qrpj": PROJECT % ("Static Library", "lib", "-O1", "", '"lib.h" "src" { "lib.cpp" "more.cpp" }'),
+    **workspace_of("lib", "app", settings="fingerprints = true\nwriteTokenEquivalent = false\n"), **TOOLS,
+    "tools/clang": TOOLS["tools/gcc-4"], "tools/clang++": TOOLS["tools/g++"],
+    "tree/lib/src/lib.qrpj": project("Static Library", "lib", '"lib.h" "src" { "lib.cpp" "more.cpp" }', "+cpp { -O1 }"),
     "tree/lib/lib.h": "int lib;\n", "tree/lib/src/lib.cpp": '@import "lib.h"\nint of_lib;\n',
     "tree/lib/src/more.cpp": "int more;\n",
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", "-O1", 'subproj { "lib" }\n+link { -lm }',
-                                        '"src" { "app.cpp" }'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }', '+cpp { -O1 }\nsubproj { "lib" }\n+link { -lm }'),
     "tree/app/src/app.cpp": '@import "lib/lib.h"\nint app;\n',
 }
 MADE = ("x64/**/*.o", "out/lib/**/*", "qrexsource/**/*.cpp", "qrexsource/**/*.h")
@@ -94,8 +83,8 @@ def test_damaged_prints_are_made_anew(workspace):
 
 
 @in_workspace({
-    "all.qrex": SETTINGS + "fingerprints = true\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n',
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", "-MMD -DNUMBER=1", "", '"src" { "app.cpp" "more.cpp" }'),
+    **workspace_of("app", settings="fingerprints = true\n"),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" "more.cpp" }', "+cpp { -MMD -DNUMBER=1 }"),
     "tree/app/src/app.cpp": "#include <cstdio>\nint more();\nint main() { std::printf(\"%d\\n\", more()); }\n",
     "tree/app/src/more.cpp": "int more() { return NUMBER; }\n"}, "make", "g++")
 def test_make_compiles_for_another_switch(workspace):

@@ -9,7 +9,7 @@ import struct
 import subprocess
 import time
 
-from runtime_fixture import link, translated_shop, write_library
+from runtime_fixture import has_header, link, translated_shop, write_library
 from workspace_fixture import ROOT, Skipped, need
 
 SOURCES = ROOT / "tests/endtoend/inspector"
@@ -21,8 +21,7 @@ THREADS = "g++ -std=c++17 -g1 -O1 -fsanitize=thread -Wno-tsan -pthread"
 def built(binary, compiler=PLAIN):
     """A workspace with the program `app`."""
     need("g++", "setarch")
-    header = subprocess.run(["g++", "-E", "-x", "c++", "-include", "boost/beast.hpp", "/dev/null"], capture_output=True)
-    if header.returncode:
+    if not has_header("boost/beast.hpp"):
         raise Skipped("boost/beast.hpp")
     workspace = translated_shop(binary, "", (SOURCES / "shop.cpp").read_text(), (SOURCES / "shop.h").read_text())
     write_library(workspace)
@@ -94,14 +93,13 @@ class Page:
     def __exit__(self, *_):
         self.socket.close()
 
-    def frame(self, data, opcode=1):
-        size = len(data)
-        head = bytes([0x80 | opcode]) + (bytes([0x80 | size]) if size < 126 else bytes([0xFE]) + struct.pack(">H", size)
-                                         if size < 65536 else bytes([0xFF]) + struct.pack(">Q", size))
-        return head + bytes(4) + data  # a mask of zeros
-
     def send(self, data, opcode=1):
-        self.socket.sendall(self.frame(data, opcode))
+        size = len(data)
+        if size < 126:
+            mark = bytes([0x80 | size])
+        else:
+            mark = bytes([0xFE]) + struct.pack(">H", size) if size < 65536 else bytes([0xFF]) + struct.pack(">Q", size)
+        self.socket.sendall(bytes([0x80 | opcode]) + mark + bytes(4) + data)  # a mask of zeros
 
     def take(self, size):
         while len(self.buffer) < size:

@@ -13,7 +13,7 @@ import tempfile
 import time
 from pathlib import Path
 
-from workspace_fixture import equal, holds, lacks, need, run_tests
+from workspace_fixture import ROOT, equal, holds, install, lacks, need, run_tests
 
 INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/qrex/editors/vim/ftdetect/qrex.vim", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex",
@@ -30,9 +30,7 @@ def installed(test):
         with tempfile.TemporaryDirectory(prefix="qrex-install-") as folder:
             prefix, work = Path(folder) / "usr", Path(folder) / "work"
             work.mkdir()
-            for component in ("tool", "runtime"):
-                subprocess.run(["cmake", "--install", os.path.dirname(os.path.abspath(binary)), "--prefix", prefix, "--component",
-                                component], check=True, stdout=subprocess.DEVNULL)
+            install(binary, prefix)
             test(prefix, work)
     run.__name__ = test.__name__
     return run
@@ -45,7 +43,7 @@ def test_components(prefix, work):
     equal((len(logs), [log for log in logs if "warning" in log]), (2, []))
 
 
-PAGE = Path(__file__).resolve().parents[2] / "docs/install.md"
+PAGE = ROOT / "docs/install.md"
 
 
 def qrex(prefix, folder, *arguments, status=0):

@@ -7,32 +7,28 @@ import signal
 import subprocess
 import time
 
-from workspace_fixture import SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 # Takes the longer the earlier its source comes, so that ends come in another order; notes how many run at once.
-COMPILER = r"""#!/bin/bash
-rsp=${2#@}; read -r text < "$rsp"
-object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
-touch "running/$$"; ls running | wc -l >> most; echo half > "$object"
+COMPILING = """touch "running/$$"; ls running | wc -l >> most; echo half > "$object"
 number=${source//[^0-9]/}; number=${number: -1}
 sleep "0.$(printf %03d $((30 * (9 - number))))"; rm "running/$$"
 case $number in
   2) echo "$source:1:1: warning: two";;
   5) echo "$source:1:1: error: five" >&2; rm "$object"; exit 1;;
   6) kill -ABRT $$;;
-esac
-cat "$source" > "$object"
-"""
-ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
-PROJECT = '$TARGET_TYPE = "Static Library"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n{ "src" { %s } }\n'
+esac"""
+
+
+def library(name, *sources):
+    return project("Static Library", name, '"src" { %s }' % " ".join(f'"{source}"' for source in sources))
 
 
 def files(faulty):
-    made = {"all.qrex": SETTINGS, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "good" "bad" }\n', "running/.keep": "",
-            "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER}
+    made = {**workspace_of("good", "bad"), **stand_ins(COMPILING), "running/.keep": ""}
     for name, numbers in (("good", (0, 1, 3, 4, 7)), ("bad", range(8) if faulty else ())):
         sources = [f"{name}{number}.cpp" for number in numbers] + [f"{name}.cpp"]
-        made[f"tree/{name}/src/{name}.qrpj"] = PROJECT % (name, " ".join(f'"{source}"' for source in sources))
+        made[f"tree/{name}/src/{name}.qrpj"] = library(name, *sources)
         made.update({f"tree/{name}/src/{source}": f"int {source[:-4]};\n" for source in sources})
     return made
 
@@ -50,7 +46,7 @@ def left(workspace):
 def compare(workspace, *arguments, status=0):
     outcomes = []
     for jobs in ("1", "4", "0"):
-        workspace.shell("rm -rf x64 out qrexsource most")
+        workspace.shell("rm -rf x64 out qrexsource most running/*")
         log = workspace.run("all.qrex", f"jobs={jobs}", *arguments, status=status)
         outcomes.append((told(log), left(workspace)))
         most = max(map(int, workspace.path("most").read_text().split()))
@@ -75,18 +71,13 @@ def test_translation_error_behind_running_compilers(workspace):
     equal(workspace.path("x64/Debug/bad/bad3.o").read_text().strip(), "int bad3;")
 
 
-# Compiles as cat does; that of `first` writes into a source of the project behind it.
-MEDDLER = r"""#!/bin/sh
-read -r text < "${2#@}"; object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}
-cat "${source%\"*}" > "$object"
-case $object in *first.o) echo 'int more;' >> tree/second/src/second.cpp;; esac
-"""
+# That of `first` writes into a source of the project behind it.
+MEDDLING = "case $object in *first.o) echo 'int more;' >> tree/second/src/second.cpp;; esac"
 
 
-@in_workspace({"all.qrex": SETTINGS, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "first" "second" }\n',
-               "tools/gcc-4": MEDDLER, "tools/ar": ARCHIVER, "tree/first/src/first.cpp": "int first;\n",
-               "tree/second/src/second.cpp": "int second;\n", "tree/first/src/first.qrpj": PROJECT % ("first", '"first.cpp"'),
-               "tree/second/src/second.qrpj": PROJECT % ("second", '"*.h" "second.cpp"'),
+@in_workspace({**workspace_of("first", "second"), **stand_ins(MEDDLING), "tree/first/src/first.cpp": "int first;\n",
+               "tree/second/src/second.cpp": "int second;\n", "tree/first/src/first.qrpj": library("first", "first.cpp"),
+               "tree/second/src/second.qrpj": library("second", "*.h", "second.cpp"),
                **{f"tree/second/src/h{number}.h": "" for number in range(500)}})
 def test_projects_see_what_those_ahead_of_them_have_written(workspace):
     workspace.run("all.qrex")
@@ -126,7 +117,7 @@ def test_make_grants_jobs(workspace):
     # With `+` the recipe is given the job server; without it the numbers alone, which lead nowhere.
     workspace.write("Makefile", "granted:\n\t+@Qrex all.qrex jobs=4 > log\nkept:\n\t@Qrex all.qrex jobs=4 > log\n")
     for target, bound in (("granted", 2), ("kept", 4)):
-        workspace.shell("rm -rf x64 out qrexsource most")
+        workspace.shell("rm -rf x64 out qrexsource most running/*")
         lacks(workspace.shell(f"make -j2 {target}"), "jobserver")
         equal(max(map(int, workspace.path("most").read_text().split())), bound)
 

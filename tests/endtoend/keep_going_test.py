@@ -1,10 +1,8 @@
 #!/usr/bin/env python3
 """A run that keeps going behind errors of translations: all are told, and what they do not touch is made."""
 
-from workspace_fixture import SETTINGS, Workspace, comparable, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import Workspace, comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
-COMPILER = '#!/bin/sh\nread -r text < "${2#@}"; object=${text#*-o \\"}; echo made > "${object%%\\"*}"\n'
-PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nsubproj { %s }\nqrex\n{ %s }\n'
 PROJECTS = {  # kind, subprojects, public headers, sources
     "core": ("Static Library", "", ("good.h", "bad.h", "over.h"), ("core.cpp", "fine.cpp")),
     "util": ("Static Library", '"core"', (), ("util.cpp",)),
@@ -18,13 +16,10 @@ TEXTS = {"core/bad.h": "int bad;\n@let 5\n", "core/over.h": '@import "bad.h"\n',
 
 
 def files():
-    made = {"all.qrex": SETTINGS, "tree/.qrwsroot": "", "tools/gcc-4": COMPILER,
-            "tools/ar": '#!/bin/sh\necho made > "$2"\n',
-            "tools/g++": '#!/bin/sh\nread -r text < "${1#@}"; target=${text#*-o \\"}; echo made > "${target%%\\"*}"\n',
-            "tree/all.qrws": '"all" { %s }\n' % " ".join(f'"{name}"' for name in PROJECTS)}
+    made = {**workspace_of(*PROJECTS), **stand_ins()}
     for name, (kind, used, headers, sources) in PROJECTS.items():
         listed = " ".join(f'"{each}"' for each in headers) + ' "src" { ' + " ".join(f'"{each}"' for each in sources) + " }"
-        made[f"tree/{name}/src/{name}.qrpj"] = PROJECT % (kind, name, used, listed)
+        made[f"tree/{name}/src/{name}.qrpj"] = project(kind, name, listed, f"subproj {{ {used} }}")
         for path in [f"{name}/{header}" for header in headers] + [f"{name}/src/{source}" for source in sources]:
             made[f"tree/{path}"] = TEXTS.get(path, f"int {name};\n")
     return made

@@ -6,16 +6,10 @@ import re
 from pathlib import Path
 
 from runtime_fixture import PLAIN, link, write_library
-from workspace_fixture import ROOT, SETTINGS, Workspace, equal, holds, need, run_tests
+from workspace_fixture import ROOT, Workspace, equal, holds, need, project, run_tests, workspace_of
 
 PAGE = ROOT / "docs/language.md"
-PROJECT = """$TARGET_TYPE = "Console Application"
-$ROOT_TO_PROJDIR = "language"
-config { "Debug|x64" }
-subproj { "Vesk/vxObject" }
-qrex
-{ "src" { "*.h" "*.cpp" } }
-"""
+PROJECT = project("Console Application", "language", '"src" { "*.h" "*.cpp" }', 'subproj { "Vesk/vxObject" }')
 KEYS = "modernCpp = true\ncompilableText = true\n"  # as --init sets them
 HEAD = '@import "Vesk/vxObject/IObject.h"\nusing vesk::xout;\n'
 BLOCK = re.compile(r"^```([^\n]*)\n(.*?)^```$", re.MULTILINE | re.DOTALL)
@@ -79,9 +73,8 @@ class Examples:
 
 
 def translate(binary, examples):
-    settings = SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true\n' + KEYS + examples.settings
-    workspace = Workspace(binary, {"all.qrex": settings, "tree/language/src/language.qrpj": PROJECT,
-                                   "tree/all.qrws": '"all" { "Vesk/vxObject" "language" }',
+    settings = f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true\n' + KEYS + examples.settings
+    workspace = Workspace(binary, {**workspace_of("Vesk/vxObject", "language", settings=settings), "tree/language/src/language.qrpj": PROJECT,
                                    "tree/language/src/language.cpp": HEAD + "vxDefineTarget(language, 2)\n"})
     for name, text in examples.sources.items():
         workspace.write("tree/language/src/" + name, text)

@@ -4,56 +4,14 @@
 import re
 
 from runtime_fixture import PLAIN, has_header, link, run_tour, translate
-from workspace_fixture import ROOT, Skipped, equal, holds, need, run_tests
+from workspace_fixture import ROOT, Skipped, data, equal, holds, need, run_tests
 
 # The tour and the scenarios without memory.
 ADDRESSES = "g++ -std=c++17 -g1 -fsanitize=address,undefined -fno-sanitize=bool -Wall -Werror -Wno-deprecated-declarations"
 THREADS = "g++ -std=c++17 -g1 -O1 -fsanitize=thread -Wno-tsan"
 
 # Loads plug-ins and unloads them. "own": the program holds a copy of their project itself.
-HOST = """#include "twice/twice.h"
-#include <dlfcn.h>
-#include <cstdio>
-
-void Register_Project_twice();
-
-template <typename Function>
-Function* Symbol(void* module, const char* name) { return reinterpret_cast<Function*>(dlsym(module, name)); }
-
-const char* Found()
-{
-    vesk::ReflectedClass const* record = vesk::Find<vesk::ReflectedClass>("Twice");
-    return record ? record->m_name : "none";
-}
-
-int main()
-{
-#ifdef OWN
-    Register_Project_twice();
-#endif
-    void* modules[2];
-    for (int i = 0; i < 2; ++i)
-    {
-        modules[i] = dlopen(i == 0 ? "./a.so" : "./b.so", RTLD_NOW | RTLD_LOCAL);
-        if (!modules[i]) return std::puts(dlerror());
-        Symbol<void()>(modules[i], "Load")();
-        vesk::AnyInterface any;
-        Symbol<void(vesk::AnyInterface*)>(modules[i], "Make")(&any);
-        const vesk::ptr<vesk::IObject> object(any);
-#ifdef OWN
-        const vesk::ptr<ITwice> twice = vesk::QueryInterface<ITwice>(object);
-        std::printf("%d ", twice ? twice->Number() : 0);
-#endif
-        object->DestroyObject();
-    }
-    std::printf("%s", Found());
-    dlclose(modules[0]);
-    std::printf(" %s", Found());
-    Symbol<void()>(modules[1], "Unload")();
-    std::printf(" %s\\n", Found());
-    dlclose(modules[1]);
-}
-"""
+HOST = data("library/host.cpp")
 
 
 def test_undefined_behaviour(binary):

@@ -2,7 +2,6 @@
 
 import json
 import queue
-import shutil
 import subprocess
 import threading
 from pathlib import Path
@@ -118,38 +117,49 @@ class Client:
             at = self.texts[name].index(text, at + 1)
         return {"textDocument": {"uri": uri_of(self.path(name))}, "position": self.position(name, at + within)}
 
-    def edit(self, name, old, new):
-        """Replaces the first `old`, as an editor tells it."""
-        at = self.texts[name].index(old)
-        change = {"range": {"start": self.position(name, at), "end": self.position(name, at + len(old))}, "text": new}
-        self.texts[name] = self.texts[name][:at] + new + self.texts[name][at + len(old):]
+    def tell_change(self, name, **change):
         self.tell("textDocument/didChange", {"textDocument": {"uri": uri_of(self.path(name)), "version": 2}, "contentChanges": [change]})
 
-    def offset(self, name, position):
-        lines = self.texts[name].split("\n")
-        line = lines[position["line"]]
-        return sum(len(ahead) + 1 for ahead in lines[:position["line"]]) + next(
-            n for n in range(len(line) + 1) if self.units(line[:n]) >= position["character"])
+    def change(self, name, begin, end, new):
+        """Replaces a part of a text, as an editor tells it."""
+        place = {"start": self.position(name, begin), "end": self.position(name, end)}
+        self.texts[name] = self.texts[name][:begin] + new + self.texts[name][end:]
+        self.tell_change(name, range=place, text=new)
+
+    def edit(self, name, old, new):
+        """Replaces the first `old`."""
+        at = self.texts[name].index(old)
+        self.change(name, at, at + len(old), new)
+
+    def rewrite(self, name, text):
+        self.texts[name] = text
+        self.tell_change(name, text=text)
 
     def apply(self, action):
         """An action with one edit of an open text, as an editor does it."""
         [(uri, [edit])] = action["edit"]["changes"].items()
-        name = str(Path(unquote(uri)[7:]).relative_to(self.folder))
-        begin, end = (self.offset(name, edit["range"][side]) for side in ("start", "end"))
-        self.texts[name] = self.texts[name][:begin] + edit["newText"] + self.texts[name][end:]
-        self.tell("textDocument/didChange", {"textDocument": {"uri": uri, "version": 2},
-                                             "contentChanges": [{"range": edit["range"], "text": edit["newText"]}]})
+        name = self.name_of(uri)
+        self.change(name, *self.offsets(self.texts[name], edit["range"]), edit["newText"])
+
+    def name_of(self, uri):
+        return str(Path(unquote(uri)[7:]).relative_to(self.folder))
+
+    def offsets(self, text, place):
+        lines = text.split("\n")
+        for position in (place["start"], place["end"]):
+            line = lines[position["line"]]
+            column = next(n for n in range(len(line) + 1) if self.units(line[:n]) >= position["character"])
+            yield sum(len(ahead) + 1 for ahead in lines[:position["line"]]) + column
 
     def text_at(self, location):
-        """(name, text) of a location or range in a file of the folder, from the text of the editor or of the disk."""
-        name = str(Path(unquote(location["uri"])[7:]).relative_to(self.folder))
+        """(name, text, its line) of a location or range in a file of the folder, from the text of the editor or of the disk."""
+        name = self.name_of(location["uri"])
         text = self.texts.get(name) or self.path(name).read_text()
-        lines = text.split("\n")
-        start, end = location["range"]["start"], location["range"]["end"]
-        columns = lambda line, units: next(n for n in range(len(line) + 1) if self.units(line[:n]) >= units)  # noqa: E731
-        line = lines[start["line"]]
-        last = columns(lines[end["line"]], end["character"]) if end["line"] == start["line"] else len(line)
-        return name, line[columns(line, start["character"]):last], line
+        begin, end = self.offsets(text, location["range"])
+        return name, text[begin:end], text.split("\n")[location["range"]["start"]["line"]]
+
+    def text_of(self, name, place):
+        return self.text_at({"uri": uri_of(self.path(name)), "range": place})[1]
 
     def until(self, name, holds):
         """Diagnostics of the file, once they are as wanted."""
@@ -164,5 +174,3 @@ def server_beside(binary):
     return str(server) if server.exists() else None
 
 
-def has_clangd():
-    return shutil.which("clangd-19") is not None

@@ -5,28 +5,20 @@ import re
 import signal
 
 import terminal_fixture
-from workspace_fixture import SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 # Prints a warning, an error and a note, each with the lines that compilers add, where the source asks for it.
-COMPILER = r"""#!/bin/bash
-rsp=${2#@}; read -r text < "$rsp"
-object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
-case $(cat "$source") in
+COMPILING = r"""case $(cat "$source") in
   *slow*) sleep 0.3;;
   *warned*) printf '%s:1:5: warning: odd [-Wodd]\n    1 | int warned;\n      |     ^~~~~~\n' "$source" >&2;;
   *wrong*) printf '%s:1:5: error: bad\n%s:1:1: note: here\n' "$source" "$source" >&2; exit 1;;
-esac
-cp "$source" "$object"
-"""
-ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
-LINKER = '#!/bin/sh\nsleep 2.4; echo "ld: told ahead of the end"; [ ! -e fail ] || exit 1; : > out/lib/x64/Debug/app\n'
-PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n%s{ "src" { %s } }\n'
+esac"""
+LINKING = 'echo "ld: told ahead of the end"'
 FILES = {
-    "all.qrex": SETTINGS, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "core" "app" }\n',
-    "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER, "tools/g++": LINKER, "inc/.keep": "",
-    "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "", '"slow.cpp" "odd.cpp" "core.cpp"'),
+    **workspace_of("core", "app"), **stand_ins(COMPILING, "sleep 2.4; " + LINKING),
+    "tree/core/src/core.qrpj": project("Static Library", "core", '"src" { "slow.cpp" "odd.cpp" "core.cpp" }'),
     "tree/core/src/slow.cpp": "int slow;\n", "tree/core/src/odd.cpp": "int warned;\n", "tree/core/src/core.cpp": "int core;\n",
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" }\n', '"app.cpp"'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }', 'subproj { "core" }'),
     "tree/app/src/app.cpp": "int app;\n",
 }
 STATUS = re.compile(r"\[\d+/\d+\] (\d+ running, )?\d+:\d\d(, [^\x1b\r]*)?")
@@ -75,7 +67,7 @@ def test_line_is_shown_and_gone(workspace):
 
 @in_workspace(FILES)
 def test_terminals_that_take_less(workspace):
-    workspace.write("tools/g++", LINKER.replace("sleep 2.4; ", ""))
+    workspace.replace("tools/g++", "sleep 2.4; ", "")
     piped = comparable(workspace.run("all.qrex"))
     for kind in ("dumb", "", None):
         workspace.clean()

@@ -2,25 +2,17 @@
 """Runs of the tool that use Python, and runs that must not need it."""
 
 import re
-from pathlib import Path
 
-from workspace_fixture import SETTINGS, Skipped, Workspace, equal, holds, run_tests
+from workspace_fixture import ROOT, Skipped, Workspace, equal, holds, indented, project, run_tests, workspace_of
 
-DOCS = Path(__file__).parents[2] / "docs/python.md"
-PROJECT = """$TARGET_TYPE = "Application"
-$ROOT_TO_PROJDIR = "app"
-qrex
-config { "Debug|x64" }
-{ "src" { %s } }
-"""
 MISSING = "/nonexistent/libpython.so"
 
 
 def translate(binary, files, status=0, **environment):
     """The run's output, and the generated text of each file."""
     listed = " ".join(f'"{name}"' for name in files if not name.endswith(".csv"))
-    with Workspace(binary, {"all.qrex": SETTINGS + "translateOnly = true", "tree/.qrwsroot": "",
-                            "tree/all.qrws": '"all" { "app" }', "tree/app/src/app.qrpj": PROJECT % listed}) as workspace:
+    described = {"tree/app/src/app.qrpj": project("Application", "app", f'"src" {{ {listed} }}')}
+    with Workspace(binary, {**workspace_of("app", settings="translateOnly = true\n"), **described}) as workspace:
         for name, text in files.items():
             workspace.write("tree/app/src/" + name, text)
         output = workspace.run("all.qrex", status=status, **environment)
@@ -29,9 +21,8 @@ def translate(binary, files, status=0, **environment):
 
 
 def need_python(binary):
-    with_python = "@runpython { x = 1 }\n"
     try:
-        translate(binary, {"t.py": with_python})
+        translate(binary, {"t.py": "@runpython { x = 1 }\n"})
     except AssertionError as failure:
         if "can't be loaded" in str(failure):
             raise Skipped("Python 2.7")
@@ -46,9 +37,7 @@ def test_a_missing_library_is_named(binary):
     # A second attempt fails as the first.
     output, _ = translate(binary, {"t.py": "@assertfails(@runpython { x = 1 })\n@runpython { x = 2 }\n"}, **python)
     holds(output, "app/src/t.py(2)")
-
-
-def test_an_empty_block_needs_no_python(binary):
+    # An empty block needs none.
     _, generated = translate(binary, {"t.py": "@runpython { }\ntext\n"}, QREX_PYTHON=MISSING)
     equal(generated, {"t.py": "text\n"})
 
@@ -64,26 +53,21 @@ def test_what_would_end_the_tool_is_an_error(binary):
     equal(generated, {"t.py": "text\n"})
 
 
-def test_the_folder_of_the_run_stays(binary):
+def test_the_folder_of_the_run_stays_and_prints_keep_their_order(binary):
     need_python(binary)
     _, generated = translate(binary, {"t.py": "@runpython { import os; os.chdir('/') }\n@defpython go = os.chdir('/usr') or 1\ngo\n",
                                       "u.py": "text\n"})
     equal(generated, {"t.py": "1\n", "u.py": "text\n"})
+    output, _ = translate(binary, {"t.py": '@print("a")\n@runpython\n{\n    print "b",\n    import sys\n'
+                                           '    sys.__stdout__.write("c")\n}\n@print("d")\n'})
+    holds(output, '"a"bc"d"')
 
 
 def test_the_documented_example(binary):
     need_python(binary)
-    blocks = re.findall(r"(?m)(?:^    .*\n)+", DOCS.read_text())
-    table, header, expected = (re.sub(r"(?m)^    ", "", block) for block in blocks)
+    table, header, expected = (block for _, block in indented((ROOT / "docs/python.md").read_text()))
     _, generated = translate(binary, {"commands.csv": table, "commands.h": header})
     holds(re.sub(r"(?m)^ +\n", "", generated["commands.h"]), expected)  # without the lines that @for leaves blank
-
-
-def test_prints_keep_their_order(binary):
-    need_python(binary)
-    output, _ = translate(binary, {"t.py": '@print("a")\n@runpython\n{\n    print "b",\n    import sys\n'
-                                           '    sys.__stdout__.write("c")\n}\n@print("d")\n'})
-    holds(output, '"a"bc"d"')
 
 
 run_tests(globals())

@@ -10,34 +10,26 @@ import time
 from pathlib import Path
 
 from browser_fixture import Browser, with_selenium
-from workspace_fixture import ROOT, SETTINGS, comparable, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import ROOT, comparable, data, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 with_selenium()
 
 # Takes as long as the source says, and prints a warning or an error where it says so.
-COMPILER = r"""#!/bin/bash
-rsp=${2#@}; read -r text < "$rsp"
-object=${text#*-o \"}; object=${object%%\"*}; source=${text##* \"}; source=${source%\"*}
-seconds=$(sed -n 's/.*slow \([0-9.]*\).*/\1/p' "$source"); sleep "${seconds:-0}"
+COMPILING = r"""seconds=$(sed -n 's/.*slow \([0-9.]*\).*/\1/p' "$source"); sleep "${seconds:-0}"
 grep -n warned "$source" | sed "s|^\([0-9]*\):.*|$source:\1:5: warning: odd <b>bold</b>|" >&2
 if grep -q wrong "$source"; then echo "$source:1:5: error: bad" >&2; exit 1; fi
-if grep -q mute "$source"; then exit 3; fi
-cp "$source" "$object"
-"""
-ARCHIVER = '#!/bin/sh\ncat $(tr -d \'"\' < "${3#@}") > "$2"\n'
-LINKER = '#!/bin/sh\nsleep 0.1; : > out/lib/x64/Debug/app\n'
-PROJECT = '$TARGET_TYPE = "%s"\n$ROOT_TO_PROJDIR = "%s"\nconfig { "Debug|x64" }\nqrex\n%s{ %s "src" { %s } }\n'
+if grep -q mute "$source"; then exit 3; fi"""
+CORE = project("Static Library", "core", '"c.h" "src" { "one.cpp" "two.cpp" "core.cpp" }')
 FILES = {
-    "all.qrex": SETTINGS + "jobs = 2\n", "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "core" "app" }\n',
-    "tools/gcc-4": COMPILER, "tools/ar": ARCHIVER, "tools/g++": LINKER,
-    "tree/core/src/core.qrpj": PROJECT % ("Static Library", "core", "", '"c.h"', '"one.cpp" "two.cpp" "core.cpp"'),
+    **workspace_of("core", "app", settings="jobs = 2\n"), **stand_ins(COMPILING, "sleep 0.1"), "tree/core/src/core.qrpj": CORE,
     "tree/core/c.h": "$enum+ E { e1 };\n",
     "tree/core/src/one.cpp": '@import "core/c.h"\nint one;  // slow 0.3\n',
     "tree/core/src/two.cpp": '@import "core/c.h"\nint two;  // slow 0.2, warned\n',
     "tree/core/src/core.cpp": "int core;\n",
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "core" }\n', "", '"app.cpp"'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" }', 'subproj { "core" }'),
     "tree/app/src/app.cpp": '@import "core/c.h"\nint main() {}\n',
 }
+RIGHT, LEFT, DOWN, ENTER, ESCAPE = "\ue014", "\ue012", "\ue015", "\ue007", "\ue00c"  # as the driver has them
 TRACE, REPORT = 'buildTrace="out/trace.json"', 'report="out/report.html"'
 HOSTILE = "core/src/</script><b>.cpp"
 
@@ -61,8 +53,7 @@ def page_data(workspace):
 
 def counted(log):
     """Warnings and errors, as the last line has them."""
-    found = re.search(r"Completed with (\d+) warnings, (\d+) errors", log)
-    return (int(found.group(1)), int(found.group(2))) if found else (0, 0)
+    return tuple(map(int, re.search(r"Completed with (\d+) warnings, (\d+) errors", log).groups()))
 
 
 def compiled(workspace):
@@ -119,17 +110,13 @@ def test_trace_of_a_run_that_fails(workspace):
 
 def shown_steps(browser):
     """What the timeline shows undimmed, by the file or output of each."""
-    return sorted(browser.run("""return [...document.querySelectorAll("rect.step:not(.dim)")].map((rect) => {
-        const span = spans[rect.dataset.span];
-        return `${span.kind} ${nameOf(span)}`;
-    })"""))
+    return sorted(browser.run("""return [...document.querySelectorAll("rect.step:not(.dim)")]
+        .map((rect) => spans[rect.dataset.span]).map((span) => `${span.kind} ${nameOf(span)}`)"""))
 
 
 def hostile_files():
-    project = "tree/core/src/core.qrpj"
-    changed = {project: FILES[project].replace('"core.cpp"', '"core.cpp" "<" { "script><b>.cpp" }'),
-               f"tree/{HOSTILE}": '@import "core/c.h"\nint hostile;  // warned\n', "tree/core/src/core.cpp": "int core;\nwrong\n"}
-    return {**FILES, **changed}
+    return {**FILES, "tree/core/src/core.qrpj": CORE.replace('"core.cpp"', '"core.cpp" "<" { "script><b>.cpp" }'),
+            f"tree/{HOSTILE}": '@import "core/c.h"\nint hostile;  // warned\n', "tree/core/src/core.cpp": "int core;\nwrong\n"}
 
 
 @in_workspace(hostile_files)
@@ -141,7 +128,8 @@ def test_page_in_a_browser(workspace):
         look_at_messages(browser)
         filter_by_click(browser)
         go_by_keys(browser)
-        look_at_narrow_page(browser)
+        fits(browser, 400, "timeline", f"timeline/{HOSTILE}", "files", "headers", "messages")
+        browser.resize(1280, 900)
         time.sleep(0.02)
         workspace.write("tree/core/c.h", "$enum+ E { e1, e2 };\n")
         workspace.run("all.qrex", REPORT)
@@ -156,10 +144,10 @@ def test_page_in_a_browser(workspace):
 
 def look_at_figures(browser, log):
     figures = dict(zip(browser.texts("#figures dt"), browser.texts("#figures dd")))
-    equal((int(figures["Warnings"]), int(figures["Errors"])), counted(log))
+    warnings, errors = counted(log)
+    equal([figures[name] for name in ("Warnings", "Errors", "Objects", "Slots")], [str(warnings), str(errors), "5", "2"])
     milliseconds = float(re.search(r"Completed.*?([\d.]+) ms", log).group(1))
     assert abs(browser.run("return data.total") / 1000 - milliseconds) < 50, (figures, milliseconds)
-    equal((figures["Objects"], figures["Slots"]), ("5", "2"))
     equal(browser.texts("#verdict"), ["Completed with errors"])
 
 
@@ -192,19 +180,18 @@ def filter_by_click(browser):
 
 
 def go_by_keys(browser):
-    right, left, down, enter, escape = "\ue014", "\ue012", "\ue015", "\ue007", "\ue00c"
-    browser.press(".scroller", right)
+    browser.press(".scroller", RIGHT)
     first = browser.texts(".told")[0]
     holds(first, "translated in", "why: no earlier build")
-    browser.press(".scroller", right, right, left, left, "+", "-")
+    browser.press(".scroller", RIGHT, RIGHT, LEFT, LEFT, "+", "-")
     equal(browser.texts(".told")[0], first)
-    browser.press(".scroller", down)
+    browser.press(".scroller", DOWN)
     holds(browser.texts(".told")[0], "compiled in", "slot 1")
-    browser.press(".scroller", enter)
+    browser.press(".scroller", ENTER)
     holds(browser.texts(".filter")[0], browser.texts(".told a")[0])
-    browser.press(".scroller", escape)
+    browser.press(".scroller", ESCAPE)
     equal(browser.texts(".filter"), [])
-    browser.press("#tab-timeline", right)
+    browser.press("#tab-timeline", RIGHT)
     equal(browser.run("return document.activeElement.id"), "tab-files")
     equal(browser.texts('[aria-selected="true"]'), ["Files"])
     nameless = """return [...document.querySelectorAll("a, button, input, [role]")].filter((element) =>
@@ -212,34 +199,18 @@ def go_by_keys(browser):
     equal(browser.run(nameless), 0)
 
 
-def look_at_narrow_page(browser):
-    browser.resize(400, 800)
-    for tab in ("timeline", f"timeline/{HOSTILE}", "files", "headers", "messages"):
+def fits(browser, width, *tabs):
+    browser.resize(width, 800)
+    for tab in tabs:
         browser.go(tab)
-        assert browser.run("return document.documentElement.scrollWidth") <= 400, tab
-    browser.resize(1280, 900)
+        assert browser.run("return document.documentElement.scrollWidth") <= width, tab
 
 
-MODELS = r'''@import "Vesk/vxObject/IObject.h"
-@print("printed ")
-$interface+ IShape : vesk::IObject { float64 Area(int32 places = 2) const; };
-$enum Side { left, right = 7 };
-$struct Point { $int32:[ unit("mm"), "</script><i>" ] x; $xmap<string8,Side> sides; };
-$model+ Note
-{
-    string8 title;
-    float64 width : [ unit("mm") ];
-    $dropped { string8 head; string8 name; int32 inches; }
-    $schema { 1: +name +inches 2: -name +head 4: -inches -head +width +title }
-    $evolve { head(name) { head = name; } title(head) { title = head; } width(inches) { width = inches * 25.4; } }
-};
-$class+ Page isa IShape : model Note { };
-'''
+MODELS = data("report/models.h")
 DECLARING = {
-    "all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n',
-    "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "app" }\n',
-    "tree/app/src/app.qrpj": PROJECT % ("Console Application", "app", 'subproj { "Vesk/vxObject" }\n', '"a.h" "b.h" "<" { "b>.h" }',
-                                        '"app.cpp" ' + " ".join(f'"m{i}.cpp"' for i in range(20))),
+    **workspace_of("app", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\nworkspaces += {{ "Vesk/vxObject" }}\ntranslateOnly = true\n'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"a.h" "b.h" "<" { "b>.h" } "src" { "app.cpp" "m*.cpp" }',
+                                     'subproj { "Vesk/vxObject" }'),
     "tree/app/a.h": '@import "app/</b>.h"\n' + MODELS, "tree/app/b.h": '@import "app/a.h"\n$struct Held { $Point at; };\n',
     "tree/app/</b>.h": "inline int b() { return 0; }\n", "tree/app/src/app.cpp": '@import "app/b.h"\nint main() { return 0; }\n',
     **{f"tree/app/src/m{i}.cpp": '@import "app/</b>.h"\n' for i in range(20)},
@@ -264,20 +235,16 @@ def test_page_without_a_build(workspace):
         look_at_history(browser)
         look_at_imports(browser)
         for width in (400, 1280):
-            browser.resize(width, 800)
-            for tab in ("models", "models/Note", "history", "history/Note", "imports", "imports/app/a.h"):
-                browser.go(tab)
-                assert browser.run("return document.documentElement.scrollWidth") <= width, tab
+            fits(browser, width, "models", "models/Note", "history", "history/Note", "imports", "imports/app/a.h")
         equal(browser.texts("main b:not(.path), main i"), [])
         equal((browser.console(), set(browser.requests())), ([], {f"file://{workspace.path('out/page.html')}"}))
 
 
 def look_at_declarations(browser):
-    found = lambda: [text.split("\n")[0] for text in browser.texts("#panel-models tbody th")]
     for words, names in (("mm", {"Note", "Point"}), ("mm script", {"Point"}), ("ISHAPE", {"IShape", "IShapeDelegatorMixin", "Page"}), ("head", {"Note"})):
         browser.run("document.querySelector('#panel-models input').value = ''")
         browser.press("#panel-models input", words)
-        equal(set(found()), names)
+        equal({text.split("\n")[0] for text in browser.texts("#panel-models tbody th")}, names)
     browser.go("models/Point")
     equal(browser.texts("#panel-models tbody tr")[0], 'x vesk::int32 mm "</script><i>"')
     holds("\n".join(browser.texts(".facts")), "tree/app/a.h:6", "Held (field at)")
@@ -289,7 +256,7 @@ def look_at_declarations(browser):
 
 def look_at_history(browser):
     """Of a name that changed twice, of what is computed, and of a release that is left out."""
-    browser.press("#tab-models", "\ue014")
+    browser.press("#tab-models", RIGHT)
     holds("\n".join(browser.texts("#panel-history tbody tr")), "Note", "4 2 1 1 2")
     browser.click('#panel-history a[href="#history/Note"]')
     equal([row.split("\n")[0] for row in browser.texts("#panel-history .plain tbody th")], ["name", "inches", "head", "width", "title"])
@@ -302,18 +269,17 @@ def look_at_history(browser):
 
 
 def look_at_imports(browser):
-    right, left, up, enter = "\ue014", "\ue012", "\ue013", "\ue007"
     browser.go("imports/app/a.h")
     equal(shown_nodes(browser), ["app/a.h", "Vesk/vxObject/IObject.h", "app/</b>.h", "app/b.h"])
-    browser.press("#panel-imports .scroller", left)
+    browser.press("#panel-imports .scroller", LEFT)
     holds(browser.texts("#panel-imports .told")[0], "app/b.h; project app; imports 1 file", "imported by 1 file, 1 in all; folded")
     browser.press("#panel-imports .scroller", " ")
     assert "app/src/app.cpp" in shown_nodes(browser) and "unfolded" in browser.texts("#panel-imports .told")[0]
-    browser.press("#panel-imports .scroller", " ", left, enter)
+    browser.press("#panel-imports .scroller", " ", LEFT, ENTER)
     equal(browser.texts("#panel-imports h2"), ["Imports around app/b.h"])
     browser.go("imports/app/</b>.h")
     equal(shown_nodes(browser), ["app/</b>.h", "app/a.h", "20 filesapp/src/"])
-    browser.press("#panel-imports .scroller", left, "\ue015", " ")
+    browser.press("#panel-imports .scroller", LEFT, DOWN, " ")
     equal(len(shown_nodes(browser)), 23)
     holds("\n".join(browser.texts("#panel-imports tbody tr")), "app/src/m7.cpp importing app 1", "app/src/app.cpp\nby way of app/b.h\nimporting app 3")
 

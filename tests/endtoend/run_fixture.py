@@ -8,6 +8,7 @@ import subprocess
 import sys
 import tempfile
 import time
+from pathlib import Path
 
 from workspace_fixture import DRIVE, run_tests
 
@@ -42,20 +43,17 @@ FILES = {
 }
 DEPENDENCIES = 'qrexsource/x64/Debug/app.qrexdep'
 TRANSLATED = 'qrexsource/x64/Debug/app/'
-MAGIC = 0x2AEF78F1
 EACH_RUN = {DEPENDENCIES, 'projects.guids'}  # written by every run
 JUNK = bytes(range(256)) * 8
 
 
 def write(path, content):
-    os.makedirs(os.path.dirname(path) or '.', exist_ok=True)
-    with open(path, 'wb') as f:
-        f.write(content if isinstance(content, bytes) else content.encode())
+    Path(path).parent.mkdir(parents=True, exist_ok=True)
+    Path(path).write_bytes(content if isinstance(content, bytes) else content.encode())
 
 
 def read(path):
-    with open(path, 'rb') as f:
-        return f.read()
+    return Path(path).read_bytes()
 
 
 def write_tree(changes={}, age=3600):
@@ -64,9 +62,8 @@ def write_tree(changes={}, age=3600):
         if content is not None:
             write(path, content)
     then = time.time() - age
-    for folder, _, names in os.walk('.'):
-        for name in names:
-            os.utime(os.path.join(folder, name), (then, then))
+    for path in files_of('.'):
+        os.utime(path, (then, then))
 
 
 def run(*arguments, status=0):

@@ -4,7 +4,7 @@ import shutil
 import subprocess
 from pathlib import Path
 
-from workspace_fixture import CACHE, ROOT, SETTINGS, Workspace, equal, holds, lacks, need
+from workspace_fixture import CACHE, ROOT, SETTINGS, Workspace, equal, holds, lacks, need, project, workspace_of
 
 TREE = ROOT / "tests/endtoend/runtime/tree"
 TOUR = ROOT / "examples" / "tour"
@@ -42,11 +42,9 @@ def translate(binary, workspace_file, keys="", tree=TREE):
 
 def translated_shop(binary, keys, main, header):
     """A workspace with the translated project `app`, of a source and `shop.h`, and the library."""
-    settings = SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true {keys}'
-    files = {"all.qrex": settings, "tree/.qrwsroot": "", "tree/all.qrws": '"all" { "Vesk/vxObject" "app" }\n',
-             "tree/app/src/shop.h": header, "tree/app/src/app.cpp": main,
-             "tree/app/src/app.qrpj": '$TARGET_TYPE = "Application"\n$ROOT_TO_PROJDIR = "app"\nqrex subproj { "Vesk/vxObject" }\n'
-                                      'config { "Debug|x64" }\n{ "src" { "shop.h" "app.cpp" } }\n'}
+    settings = f'virtualTree += {{ "{ROOT / "runtime"}" }} translateOnly = true compilableText = true {keys}'
+    files = {**workspace_of("Vesk/vxObject", "app", settings=settings), "tree/app/src/shop.h": header, "tree/app/src/app.cpp": main,
+             "tree/app/src/app.qrpj": project("Application", "app", '"src" { "shop.h" "app.cpp" }', 'subproj { "Vesk/vxObject" }')}
     workspace = Workspace(binary, files)
     workspace.run("all.qrex")
     return workspace

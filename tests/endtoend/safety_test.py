@@ -7,21 +7,18 @@ import signal
 import subprocess
 import time
 
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
-PROJECT = """$TARGET_TYPE = "Console Application"
-$ROOT_TO_PROJDIR = "%s"
-qrex
-config { "%s|%s" }
-{ "src" { "a.cpp" } }
-"""
-FILES = {
-    "all.qrex": SETTINGS,
-    "tree/.qrwsroot": "",
-    "tree/all.qrws": '"all" { "app" }\n',
-    "tree/app/src/a.cpp": "int main() { return 0; }\n",
-    "tree/app/src/app.qrpj": PROJECT % ("app", "Debug", "x64"),
-}
+PROJECT = "tree/app/src/app.qrpj"
+FILES = {**workspace_of("app"), "tree/app/src/a.cpp": "int main() { return 0; }\n",
+         PROJECT: project("Console Application", "app", '"src" { "a.cpp" }')}
+
+
+def searching(pattern, **files):
+    """The files, whose project takes what is found."""
+    return {**FILES, PROJECT: FILES[PROJECT].replace('"a.cpp"', pattern), **files}
+
+
 # Names that the shell would run, or end a word at; each would leave a file behind.
 NAMES = ["$(touch RAN)", "`touch RAN`", "a;touch RAN;b", "a&touch RAN&", "$HOME", "a' b", "a, b", "~", "a*", "-x", "@x"]
 
@@ -34,7 +31,7 @@ def test_names_do_not_run(binary):
             f"tree {name}/.qrwsroot": "",
             f"tree {name}/all.qrws": f'"all" {{ "{name}" }}\n',
             f"tree {name}/{name}/src/a.cpp": "int main() { return 0; }\n",
-            f"tree {name}/{name}/src/{name}.qrpj": PROJECT % (name, name, name),
+            f"tree {name}/{name}/src/{name}.qrpj": FILES[PROJECT].replace('"app"', f'"{name}"').replace("Debug|x64", f"{name}|{name}"),
         }
         with Workspace(binary, files) as workspace:
             holds(workspace.run("all.qrex"), "\nCompleted..")
@@ -52,11 +49,10 @@ def test_names_do_not_run(binary):
 def test_sources_and_folders_are_names(workspace):
     folder = 'x" -wrapper .,EVIL "y/'
     names = ["a\\b.cpp", "a b.cpp", "a'b.cpp", "-x.cpp", "@x.cpp", "#a.cpp", "$(touch RAN).cpp"]
-    project = PROJECT.replace("qrex", "+cpp { -fPIC } qrex").replace('"a.cpp"', '"*.cpp"') % ("app", "Debug", "x64")
-    for name, text in {**FILES, "tree/app/src/app.qrpj": project.replace("Console Application", "Dynamic-Link Library")}.items():
+    sources = {f"tree/app/src/{name}": f"int Named{number};\n" for number, name in enumerate(names)}
+    library = project("Dynamic-Link Library", "app", '"src" { "*.cpp" }', "+cpp { -fPIC }")
+    for name, text in {**FILES, PROJECT: library, **sources}.items():
         workspace.write(folder + name, text)
-    for number, name in enumerate(names):
-        workspace.write(f"{folder}tree/app/src/{name}", f"int Named{number};\n")
     output = workspace.shell(f"cd '{folder}' && Qrex all.qrex")
     holds(output, "\nCompleted..")
     symbols = workspace.shell(f"cd '{folder}' && nm -D out/lib/x64/Debug/libapp.so && Qrex all.qrex mode=gen")
@@ -71,18 +67,16 @@ def test_sources_and_folders_are_names(workspace):
 
 
 def test_a_quote_in_a_name_is_refused(binary):
+    plain = FILES[PROJECT]
     changes = [("tree/all.qrws", '"all" { "a\\"pp" }\n', 'tree/all.qrws(1) : ', '"a\\"pp"'),
-               ("tree/app/src/app.qrpj", PROJECT % ("app", 'De\\"bug', "x64"), "app.qrpj(4) : ", '"De\\"bug|x64"'),
-               ("tree/app/src/app.qrpj", (PROJECT % ("app", "Debug", "x64")).replace('"a.cpp"', '"a.cpp" as "a\\"a.cpp"'),
-                "app.qrpj(5) : ", '"a\\"a.cpp"'),
-               ("all.qrex", SETTINGS + 'config = "De\\"bug"\n', "all.qrex(13) : ", '"De\\"bug"'),
-               ("all.qrex", SETTINGS + '$TARGET_DIR = "De\\"bug/x64"\n', "all.qrex(13) : ", '"De\\"bug/x64"'),
-               ("all.qrex", SETTINGS + 'virtualTree = { "tr\\"ee" }\n', "all.qrex(13) : ", '"tr\\"ee"')]
+               (PROJECT, plain.replace("Debug", 'De\\"bug'), "app.qrpj(3) : ", '"De\\"bug|x64"'),
+               (PROJECT, plain.replace('"a.cpp"', '"a.cpp" as "a\\"a.cpp"'), "app.qrpj(6) : ", '"a\\"a.cpp"')]
+    for line, name in (('config = ', '"De\\"bug"'), ('$TARGET_DIR = ', '"De\\"bug/x64"'), ('virtualTree = ', '{ "tr\\"ee" }')):
+        changes.append(("all.qrex", SETTINGS + line + name + "\n", "all.qrex(13) : ", name.strip("{ }")))
     for path, text, place, name in changes:
         with Workspace(binary, {**FILES, path: text}) as workspace:
             holds(workspace.run("all.qrex", status=1), place + "A double quote can't stand in " + name)
-    with Workspace(binary, {**FILES, "tree/app/src/app.qrpj": PROJECT.replace('"a.cpp"', '"*.cpp"') % ("app", "Debug", "x64"),
-                            'tree/app/src/b"b.cpp': ""}) as workspace:
+    with Workspace(binary, searching('"*.cpp"', **{'tree/app/src/b"b.cpp': ""})) as workspace:
         holds(workspace.run("all.qrex", status=1), "A double quote can't stand in app/src/b\"b.cpp")
 
 
@@ -105,31 +99,23 @@ def test_builds_in_one_folder_follow_each_other(workspace):
     lacks(workspace.run("all.qrex", "translateOnly=true"), "Waiting")
 
 
-# A compiler and a linker that copy.
-COPYING = {"tools/gcc-4": "#!/bin/sh\neval set -- $(tr -d '\\r' < \"${2#@}\")\n"
-                          "while [ $# -gt 1 ]; do [ \"$1\" = -o ] && out=$2; shift; done\ncat \"$1\" > \"$out\"\n",
-           "tools/g++": "#!/bin/sh\neval set -- $(tr -d '\\r' < \"${1#@}\")\ncat \"$3\" > \"$2\"\n"}
 TARGET = "out/lib/x64/Debug/app"
 
 
-@in_workspace({**FILES, **COPYING})
-def test_a_parent_that_ignores_the_end_of_children(workspace):
+@in_workspace({**FILES, **stand_ins(), "x64/Debug/app/compiler.rsp": "", "out1.txt": ""})
+def test_what_others_have_left(workspace):
+    """Files of ours that nobody may read, and a parent that ignores the end of children."""
+    for name in ("x64/Debug/app/compiler.rsp", "out1.txt"):
+        workspace.path(name).chmod(0)
     done = subprocess.run([workspace.binary, "all.qrex"], cwd=workspace.folder, stdout=subprocess.PIPE, text=True,
                           preexec_fn=lambda: signal.signal(signal.SIGCHLD, signal.SIG_IGN))
     holds(done.stdout, "\nCompleted..")
     lacks(done.stdout, "ode : ")
     assert workspace.path(TARGET).exists()
-
-
-@in_workspace({**FILES, **COPYING, "x64/Debug/app/compiler.rsp": "", "out1.txt": ""})
-def test_files_of_ours_that_nobody_may_read_are_replaced(workspace):
-    for name in ("x64/Debug/app/compiler.rsp", "out1.txt"):
-        workspace.path(name).chmod(0)
-    holds(workspace.run("all.qrex"), "\nCompleted..")
     assert not workspace.path("out1.txt").exists() and not workspace.path("x64/Debug/app/compiler.rsp").exists()
 
 
-@in_workspace({**FILES, **COPYING})
+@in_workspace({**FILES, **stand_ins()})
 def test_a_clock_that_was_ahead(workspace):
     workspace.run("all.qrex")
     workspace.shell("find x64 out/lib -type f -exec touch -d '1 hour' {} +")
@@ -155,9 +141,9 @@ def test_writes_beyond_the_limit_of_file_sizes_fail(workspace):
 IMPORTS = 10000
 
 
-@in_workspace(lambda: {**FILES, "tree/app/src/app.qrpj": PROJECT.replace('"a.cpp"', '"*.h" "a.cpp"') % ("app", "Debug", "x64"),
-                       "tree/app/src/a.cpp": '@import "h0.h"\n', f"tree/app/src/h{IMPORTS}.h": "",
-                       **{f"tree/app/src/h{i}.h": f'@import "h{i + 1}.h"\n' for i in range(IMPORTS)}})
+@in_workspace(lambda: searching('"*.h" "a.cpp"', **{
+    "tree/app/src/a.cpp": '@import "h0.h"\n', f"tree/app/src/h{IMPORTS}.h": "",
+    **{f"tree/app/src/h{i}.h": f'@import "h{i + 1}.h"\n' for i in range(IMPORTS)}}))
 def test_a_long_chain_of_imports_works_or_is_refused(workspace):
     output = workspace.shell("(ulimit -v 300000; Qrex all.qrex translateOnly=true) || echo status $?")
     if "status" in output and "AddressSanitizer failed to allocate" not in output:  # whose own memory is above the limit
@@ -166,16 +152,13 @@ def test_a_long_chain_of_imports_works_or_is_refused(workspace):
         holds(workspace.run("all.qrex", "translateOnly=true"), "\nCompleted..")
 
 
-SEARCH = {**FILES, "tree/app/src/app.qrpj": PROJECT.replace('"a.cpp"', '"*.cpp"') % ("app", "Debug", "x64")}
-
-
-@in_workspace(SEARCH)
+@in_workspace(searching('"*.cpp"'))
 def test_what_a_search_cannot_read_is_told(workspace):
     for name, target in (("gone.cpp", "none"), ("other.txt", "other.txt")):  # what is not there, and is not searched for
         workspace.path(f"tree/app/src/{name}").symlink_to(target)
     workspace.run("all.qrex", "translateOnly=true")
     workspace.path("tree/app/src/loop.cpp").symlink_to("loop.cpp")
-    holds(workspace.run("all.qrex", "translateOnly=true", status=1), "app.qrpj(5) : Couldn't read tree/app/src/loop.cpp : ")
+    holds(workspace.run("all.qrex", "translateOnly=true", status=1), "app.qrpj(6) : Couldn't read tree/app/src/loop.cpp : ")
 
 
 @in_workspace({**FILES, "elsewhere": "theirs"}, "g++")

@@ -3,7 +3,7 @@
 
 import shutil
 
-from workspace_fixture import ROOT, SETTINGS, equal, holds, in_workspace, lacks, run_tests
+from workspace_fixture import ROOT, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 LOCK = "kept/all.schemas"
 HEAD = "# Releases of models whose archives can be read. Kept by Qrex, to be committed.\n"
@@ -38,11 +38,9 @@ app n::Part model = kinds:xvector<n::Kind>
 """
 KEY = f'schemaLock = "{LOCK}"\n'
 FILES = {
-    "all.qrex": SETTINGS + f'virtualTree += {{ "{ROOT / "runtime"}" }}\ntranslateOnly = true\n',
-    "tree/.qrwsroot": "",
-    "tree/all.qrws": '"all" { "app" "Vesk/vxObject" }\n',
-    "tree/app/src/app.qrpj": '$TARGET_TYPE = "Console Application"\n$ROOT_TO_PROJDIR = "app"\nsubproj { "Vesk/vxObject" } qrex\n'
-                             'config { "Debug|x64" }\n{ "src" { "kinds.h" "note.h" "other.h" "other.cpp" "app.cpp" } }\n',
+    **workspace_of("app", "Vesk/vxObject", settings=f'virtualTree += {{ "{ROOT / "runtime"}" }}\ntranslateOnly = true\n'),
+    "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "kinds.h" "note.h" "other.h" "other.cpp" "app.cpp" }',
+                                     'subproj { "Vesk/vxObject" }'),
     "tree/app/src/kinds.h": IMPORT + KINDS,
     "tree/app/src/note.h": '@import "kinds.h"\n' + NOTE,
     "tree/app/src/other.h": IMPORT + OTHER,
@@ -50,10 +48,17 @@ FILES = {
     "tree/app/src/app.cpp": '@import "kinds.h"\n@import "note.h"\nvxDefineTarget(app, 10)\nint main() { return 0; }\n',
 }
 KEYED = {**FILES, "all.qrex": FILES["all.qrex"] + KEY}
+HEADER_OF = {"Kind": ("kinds.h", "low, high"), "Other": ("other.h", "int32 a;\n    $schema { 2: +a }")}
 
 
 def lock(workspace):
     return workspace.path(LOCK).read_text()
+
+
+def change(workspace, name, new):
+    """Gives a declaration another body than it has at first."""
+    file, old = HEADER_OF[name]
+    workspace.edit(f"tree/app/src/{file}", old, new)
 
 
 @in_workspace(KEYED)
@@ -61,16 +66,14 @@ def test_what_is_new_is_recorded(workspace):
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES)
     before = workspace.times("**/*")
-    workspace.run("all.qrex")
-    workspace.run("all.qrex", "rebuildAll=true")
-    workspace.run("all.qrex", "mode=clean")
-    workspace.run("all.qrex", "mode=gen")
+    for line in ("jobs=1", "rebuildAll=true", "mode=clean", "mode=gen"):
+        workspace.run("all.qrex", line)
     lacks(str(workspace.changed(before, "**/*")), LOCK)
     assert not list(workspace.folder.glob("qrexsource/**/*.qrexschemas")) and workspace.path(LOCK).exists()
     workspace.run("all.qrex")
-    workspace.edit("tree/app/src/kinds.h", "low, high", "low, high, last")
+    change(workspace, "Kind", "low, high, last")
     workspace.edit("tree/app/src/kinds.h", "int32 count;", "int32 count; bool;")
-    workspace.edit("tree/app/src/other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
+    change(workspace, "Other", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES.replace("high:1", "high:1 last:2").replace("count:int32", "count:int32 :bool").replace(
         "Other 2 = +a:int32\n", "Other 2 = +a:int32\napp Other 10 = +b:int32\n"))
@@ -97,7 +100,7 @@ def test_what_is_recorded_stays(workspace):
     """Each change is an error at the $schema, in this run and the next; taken back, all is well."""
     workspace.run("all.qrex")
     next_release = "and what is new as release 11"
-    places = {"note.h": 8, "other.h": 5}
+    lines = {"note.h": 8, "other.h": 5, "kinds.h": 5}
     for name, old, new, at, told in [
             ("note.h", "10: -old +part +parts", "10: -old +parts +part", "note.h",
              [f'Release 10 of $model Note is "-old +part:n::Part +parts:xmap<int32,n::Either>" in {LOCK}(3) and "-old +parts:', next_release]),
@@ -106,7 +109,7 @@ def test_what_is_recorded_stays(workspace):
             ("kinds.h", "$typedef int32 Number", "$typedef int64 Number", "note.h", ["+old:int64"]),
             ("other.h", "2: +a", "3: +a", "other.h", ["Release 3 of $model Other is new, and archives of releases up to 10", "make it release 11"]),
             ("other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 5: +b }", "other.h", ["Release 5 ", "make it release 11"]),
-            ("other.h", "$schema { 2: +a }", "/* none */", 2, ["Release 2 of $model Other stands in", 'Write "2: +a" again']),
+            ("other.h", "$schema { 2: +a }", "/* none */", "", ["Release 2 of $model Other stands in", 'Write "2: +a" again']),
             ("kinds.h", "low, high", "low = 1, high", "note.h", [f'$model Note stores n::Kind, which is "low:0 high:1" in {LOCK}(6)', "with their numbers"]),
             ("kinds.h", "low, high", "high", "note.h", ['and "high:0" now']),
             ("kinds.h", "Kind; int32 count;", "int32 count; Kind;", "note.h", ["stores n::Either", "Give the items back in their order"]),
@@ -114,11 +117,9 @@ def test_what_is_recorded_stays(workspace):
             ("kinds.h", "xvector<Kind> kinds;", "xvector<Kind> kinds; bool b; $schema { 1: +b 11: +kinds }", "kinds.h",
              ['The first release of $model n::Part is "+b:bool"', '"+kinds:xvector<n::Kind>"'])]:
         workspace.edit(f"tree/app/src/{name}", old, new)
-        line = at if isinstance(at, int) else places.get(at, 5)
-        file = name if isinstance(at, int) else at
-        for lines in ([], [], ["keepGoing=true"], []):
-            output = workspace.run("all.qrex", *lines, status=1)
-            holds(output, f"tree/app/src/{file}({line}) : error : ", *told)
+        place = f"{at}({lines[at]})" if at else f"{name}(2)"
+        for line in ("jobs=1", "jobs=1", "keepGoing=true", "jobs=1"):
+            holds(workspace.run("all.qrex", line, status=1), f"tree/app/src/{place} : error : ", *told)
             equal(lock(workspace), HEAD + LINES)
         workspace.edit(f"tree/app/src/{name}", new, old)
         workspace.run("all.qrex")
@@ -137,7 +138,7 @@ def test_partial_runs(workspace):
     workspace.run("all.qrex")
     equal(lock(workspace), HEAD + LINES)
     workspace.edit("tree/app/src/other.h", "$schema { 2: +a }", "$schema { 2: +a }\n@fail(\"no\")\n")
-    workspace.edit("tree/app/src/kinds.h", "low, high", "low, high, last")
+    change(workspace, "Kind", "low, high, last")
     holds(workspace.run("all.qrex", "keepGoing=true", status=1), "other.h(6)")
     equal(lock(workspace), HEAD + LINES.replace("high:1", "high:1 last:2"))
     workspace.edit("tree/app/src/other.h", "\n@fail(\"no\")\n", "")
@@ -195,7 +196,7 @@ def test_a_lock_that_is_none(workspace):
 @in_workspace(KEYED)
 def test_the_release_of_the_target(workspace):
     workspace.run("all.qrex")
-    workspace.edit("tree/app/src/other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 12: +b }")  # app.cpp is not stale by it
+    change(workspace, "Other", "int32 a; int32 b;\n    $schema { 2: +a 12: +b }")  # app.cpp is not stale by it
     told = "app.cpp(3) : error : The target of the project writes archives of release 10, and a $schema of it has release 12"
     for lines in ([], [], ["keepGoing=true"], ["rebuildAll=true"], []):
         holds(workspace.run("all.qrex", *lines, status=1), told)
@@ -203,34 +204,6 @@ def test_the_release_of_the_target(workspace):
     lacks(workspace.run("all.qrex"), "error")
     workspace.edit("tree/app/src/app.cpp", "(app, 12)", "(app, 11)")
     holds(workspace.run("all.qrex", status=1), "define the target with 12")
-
-
-@in_workspace(KEYED, "git")
-def test_branches_are_merged(workspace):
-    """Git merges what two branches record of different models; of one release it leaves a conflict, which is told."""
-    git = "git -c user.name=a -c user.email=a@example.org "
-    workspace.write(".gitignore", "qrexsource/\nout/\n")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} init -q -b one && {git} add . && {git} commit -qm base && {git} checkout -qb two")
-    workspace.edit("tree/app/src/kinds.h", "low, high", "low, high, last")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam two && {git} checkout -q one")
-    workspace.edit("tree/app/src/other.h", "int32 a;\n    $schema { 2: +a }", "int32 a; int32 b;\n    $schema { 2: +a 10: +b }")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam one && {git} merge -q two -m both")
-    workspace.run("all.qrex")
-    holds(lock(workspace), "app Other 10 = +b:int32\n", "low:0 high:1 last:2")
-    equal(workspace.shell(f"{git} status --porcelain"), "")
-    workspace.shell(f"{git} checkout -qb three")
-    workspace.edit("tree/app/src/other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; bool c;\n    $schema { 2: +a 10: +b 11: +c")
-    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 11)")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam three && {git} checkout -q one")
-    workspace.edit("tree/app/src/other.h", "int32 b;\n    $schema { 2: +a 10: +b", "int32 b; int8 d;\n    $schema { 2: +a 10: +b 11: +d")
-    workspace.edit("tree/app/src/app.cpp", "(app, 10)", "(app, 11)")
-    workspace.run("all.qrex")
-    workspace.shell(f"{git} commit -qam four; {git} merge -q three -m all", status=1)
-    holds(workspace.run("all.qrex", status=1), f"{LOCK}(", ") : error : A merge has left a conflict here")
 
 
 run_tests(globals())

@@ -3,26 +3,11 @@
 
 import os
 import re
-from pathlib import Path
 
-from workspace_fixture import equal, holds, in_workspace, run_tests
+from workspace_fixture import ROOT, equal, holds, in_workspace, indented, run_tests
 
-PAGE = Path(__file__).resolve().parents[2] / "docs/tutorial.md"
+PAGE = ROOT / "docs/tutorial.md"
 FILE = re.compile(r"(?:^|.*\. )`([^`]+)`:$")  # ahead of a block: its name
-
-
-def blocks(text):
-    """The indented blocks of a page, each with the last line of text ahead of it."""
-    ahead, block = "", []
-    for line in text.splitlines() + ["end"]:
-        if line.startswith("    ") or (block and not line):
-            block.append(line[4:])
-            continue
-        if block:
-            yield ahead, "\n".join(block).rstrip("\n") + "\n"
-            block = []
-        if line:
-            ahead = line
 
 
 def commands(block):
@@ -36,7 +21,7 @@ def follow(workspace, text):
     """Follows the page; how many files it wrote and how many commands it ran."""
     files = typed = 0
     folder = "."
-    for ahead, block in blocks(text):
+    for ahead, block in indented(text):
         name = FILE.match(ahead)
         if name:
             workspace.write(os.path.join(folder, name.group(1)), block)

@@ -36,6 +36,33 @@ if os.path.isdir(CACHE):
 # The drive that the tool of another system puts ahead of paths, where that is what runs (tests/windows).
 DRIVE = os.environ.get("QREX_DRIVE", "")
 
+def project(kind, root, files, statements=""):
+    """The text of a project that is translated, with one configuration."""
+    return f'$TARGET_TYPE = "{kind}"\n$ROOT_TO_PROJDIR = "{root}"\nconfig {{ "Debug|x64" }}\n{statements}\nqrex\n{{ {files} }}\n'
+
+
+def workspace_of(*names, settings=""):
+    """The files of a workspace of these projects but for their own."""
+    listed = " ".join(f'"{name}"' for name in names)
+    return {"all.qrex": SETTINGS + settings, "tree/.qrwsroot": "", "tree/all.qrws": f'"all" {{ {listed} }}\n'}
+
+
+def stand_ins(ahead="", linking=""):
+    """Tools of the gcc family: an object is its source, a library or program what went into it. What runs ahead of a compilation
+    has $object and $source, what runs ahead of a link $target."""
+    return {"tools/gcc-4": f"""#!/bin/bash
+text=$(tr -d '\\r' < "${{2#@}}"); object=${{text#*-o \\"}}; object=${{object%%\\"*}}; source=${{text##* \\"}}; source=${{source%\\"*}}
+{ahead}
+cat "$source" > "$object"
+""", "tools/ar": """#!/bin/sh
+cat $(tr -d '"\\r' < "${3#@}") > "$2"
+""", "tools/g++": f"""#!/bin/sh
+text=$(tr -d '"\\r' < "${{1#@}}"); set -- $text; target=$2; shift 2
+{linking}
+{{ echo "$text"; for word; do [ ! -f "$word" ] || cat "$word"; done; }} > "$target"
+"""}
+
+
 # The words of `compiler`, in their order.
 COMPILERS = ["vc6", "vc8", "vc9", "vc10", "vc11", "vc12", "vc14", "gcc", "winegcc", "clang"]
 
@@ -60,6 +87,11 @@ PROGRAM_FILES = {
     "tree/dll/dll.h": "int dll();\n",
     "tree/dll/src/dll.cpp": '@import "dll/dll.h"\nint dll() { return 2; }\n',
 }
+
+
+def data(name):
+    """A source that a test translates."""
+    return (ROOT / "tests/endtoend/data" / name).read_text()
 
 
 class Skipped(Exception):
@@ -152,6 +184,19 @@ def holds(text, *parts):
 
 def lacks(text, part):
     assert part not in text, f"{part!r} stands in\n{text}"
+
+
+def indented(page):
+    """The indented blocks of a page, each with the line of text ahead of it."""
+    found = re.findall(r"^(\S.*)\n\n((?:    .*\n|\n+(?=    ))+)", page, re.MULTILINE)
+    return [(ahead, re.sub(r"^    ", "", block, flags=re.MULTILINE)) for ahead, block in found]
+
+
+def install(binary, prefix):
+    """The tool and its runtime, below a prefix."""
+    for component in ("tool", "runtime"):
+        subprocess.run(["cmake", "--install", os.path.dirname(os.path.abspath(binary)), "--prefix", prefix, "--component", component],
+                       check=True, stdout=subprocess.DEVNULL)
 
 
 def need(*tools):

@@ -90,12 +90,6 @@ def outputs(folder):
     return contents
 
 
-def run(binary, folder, arguments, **environment):
-    return subprocess.run([binary, "all.qrex", *arguments], cwd=folder, stdin=subprocess.DEVNULL,
-                          stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=60,
-                          env={**os.environ, **environment})
-
-
 def lines(output):
     """What was said, without the figures of times."""
     text = output.decode(errors="replace").replace("\r", "")
@@ -117,15 +111,12 @@ class Kind:
         for path in self.start.rglob("*"):
             os.utime(path, (age, age))
         if earlier:
-            self.require(run(binary, self.start, earlier))
+            self.require(self.run(self.start, earlier))
             self.before = outputs(self.start)
             time.sleep(0.02)
-            with open(self.start / "tree/zoo/zoo.h", "a") as header:
-                header.write("int added;\n")
-            with open(self.start / "tree/zoo/big.h", "a") as header:
-                header.write("$struct+ Last { $int32 a; };\n")
-            with open(self.start / "tree/zoo/notes.txt", "a") as notes:
-                notes.write("the end\n")
+            for name, text in (("zoo.h", "int added;\n"), ("big.h", "$struct+ Last { $int32 a; };\n"), ("notes.txt", "the end\n")):
+                with open(self.start / "tree/zoo" / name, "a") as file:
+                    file.write(text)
         else:
             self.before = {}
         calls = self.start / "tools/calls"
@@ -133,14 +124,16 @@ class Kind:
         calls.mkdir()
         end = self.copy(folder / "undisturbed")
         counts = folder / "counts"
-        done = run(binary, end, self.arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts))
+        done = self.run(end, self.arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts))
         self.require(done)
         self.expected, self.said = outputs(end), lines(done.stdout)
         self.counts = {call: int(count) for call, count in (line.split() for line in counts.read_text().splitlines())}
-        made = end / "tools/calls"
-        self.tools = len(list(made.iterdir()))
+        self.tools = len(list((end / "tools/calls").iterdir()))
         self.counts.update({f"keeper {call}": self.tools for call in ("fork", "send")})
         shutil.rmtree(end)
+
+    def run(self, folder, arguments, **environment):
+        return workspaces.run(self.binary, folder, "all.qrex", *arguments, **environment)
 
     @staticmethod
     def require(done):
@@ -169,14 +162,14 @@ class Kind:
         self.mended(folder)
 
     def mended(self, folder):
-        done = run(self.binary, folder, self.arguments)
+        done = self.run(folder, self.arguments)
         if done.returncode != 0:
             raise Violation("the next run fails: " + done.stdout.decode()[-600:])
         self.compare(folder, "the next run ends with other files:")
         times = lambda: {path: path.stat().st_mtime_ns for path in folder.rglob("*") if path.is_file()
                          and not path.name.endswith((".qrexdep", ".qrexprint", "projects.guids"))}
         before = times()
-        run(self.binary, folder, self.arguments)
+        self.run(folder, self.arguments)
         noted = [str(path.relative_to(folder)) for path, stamp in times().items() if before.get(path) != stamp]
         if noted:
             raise Violation(f"there is something left to do: {noted}")
@@ -195,7 +188,7 @@ def disturbed(kind, folder, *faults):
     who = "keeper" if calls.startswith("keeper ") else "tool"
     told = " and ".join(f"{call} {at} {how} {errno.errorcode.get(number, '')}" for call, at, how, number in faults)
     try:
-        done = run(kind.binary, folder, kind.arguments, LD_PRELOAD=kind.library, FAULT_CALL=calls.removeprefix("keeper "),
+        done = kind.run(folder, kind.arguments, LD_PRELOAD=kind.library, FAULT_CALL=calls.removeprefix("keeper "),
                    FAULT_AT=points, FAULT_HOW=ways, FAULT_ERRNO=errors, FAULT_WHO=who)
         kind.check(folder, done, "kill" in ways and who == "tool")
     except Violation as violation:
@@ -218,7 +211,7 @@ def full_disk(kind, folder, kib):
             kind.copy(mount / "w")
         except shutil.Error:
             return "no room for the workspace"
-        done = run(kind.binary, mount / "w", kind.arguments)
+        done = kind.run(mount / "w", kind.arguments)
         shutil.copytree(mount / "w", folder / "w", symlinks=True)
     finally:
         subprocess.run(["umount", "--lazy", mount], check=True)  # a thread that forks has our files open for a moment
@@ -274,15 +267,9 @@ def all_rows(binary, library, folder, short, mounts, names):
     if names:
         return
     kinds = {name: RUNS[name][0] for name in ("translate", "build")}
-    runs = stamps.Runs(binary, stamps.build_library(folder), run, outputs)
+    runs = stamps.Runs(binary, workspaces.build_library(folder, "coarse"), outputs)
     yield from stamps.rows(runs, folder / "build", folder, kinds, short)
     yield from layout.rows(binary, library, folder, FAULTS, lambda count: some(count, 3 if short else 10**6))
-
-
-def build_library(folder):
-    library = folder / "inject.so"
-    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, HERE / "inject.c", "-ldl"], check=True)
-    return str(library)
 
 
 def main():
@@ -299,7 +286,7 @@ def main():
     if options.markdown:
         print("| Run | Fault | Disturbed runs | How all of them ended |\n|---|---|---|---|")
     try:
-        library = build_library(folder)
+        library = workspaces.build_library(folder, "inject")
         mounts = can_mount(folder)
         if not mounts:
             print("full disks are left out: mount needs the superuser")

@@ -1,17 +1,16 @@
-/* A library that is preloaded into the tool and lets one of its system calls go wrong.
- *
- * FAULT_CALL   which calls are counted: a name of kNames
- * FAULT_AT     the number of the call that goes wrong, from 1; 0 or unset: none does
- * FAULT_HOW    fail (with FAULT_ERRNO), short (reads and writes: half of what was asked), kill (the process, ahead of
- *              the call)
- * FAULT_ERRNO  the number of the error
- * FAULT_STICKS set: all calls of the kind behind the one that failed fail too
- * FAULT_WHO    keeper: the calls of the process that the tool forks to run tools, not those of the one that was started
- * FAULT_COUNTS a file that gets "NAME COUNT" lines when the process ends
- *
- * The first four may be lists, separated by commas: several faults in one run.
- * Calls that the C library makes inside itself are not seen; so the stream functions are counted as calls of their own.
- * The tools that are run are not concerned. */
+// A library that is preloaded into the tool and lets one of its system calls go wrong.
+//
+// FAULT_CALL   which calls are counted: a name of kNames
+// FAULT_AT     the number of the call that goes wrong, from 1; 0 or unset: none does
+// FAULT_HOW    fail (with FAULT_ERRNO), short (reads and writes: half of what was asked), kill (the process, ahead of
+//              the call)
+// FAULT_ERRNO  the number of the error
+// FAULT_WHO    keeper: the calls of the process that the tool forks to run tools, not those of the one that was started
+// FAULT_COUNTS a file that gets "NAME COUNT" lines when the process ends
+//
+// The first four may be lists, separated by commas: several faults in one run.
+// Calls that the C library makes inside itself are not seen; so the stream functions are counted as calls of their own.
+// The tools that are run are not concerned.
 #define _GNU_SOURCE
 #include <dirent.h>
 #include <dlfcn.h>
@@ -31,21 +30,21 @@
 #include <unistd.h>
 
 enum Call { OPEN, READ, WRITE, CLOSE, STAT, RENAME, UNLINK, MKDIR, CHMOD, UTIME, OPENDIR, READDIR, FOPEN, FWRITE, FFLUSH,
-            FCLOSE, FORK, SEND, RECV, WAITPID, CALLS };
+            FCLOSE, FORK, SEND, RECV, CALLS };
 static const char* const kNames[CALLS] = {"open",  "read",    "write",   "close", "stat",   "rename", "unlink", "mkdir", "chmod",
-                                          "utime", "opendir", "readdir", "fopen", "fwrite", "fflush", "fclose", "fork", "send", "recv", "waitpid"};
+                                          "utime", "opendir", "readdir", "fopen", "fwrite", "fflush", "fclose", "fork", "send", "recv"};
 
 static atomic_long counts[CALLS];
 static struct Fault {
   int call, error, is_short, kills;
   long at;
 } faults[4];
-static int fault_count, sticks, generation; /* 0: the process that was started, 1: its keeper, 2: a tool */
+static int fault_count, generation; // 0: the process that was started, 1: its keeper, 2: a tool
 static int faulty_generation;
-static __thread int error_number, is_short; /* of the call that goes wrong */
+static __thread int error_number, is_short; // of the call that goes wrong
 static const char* counts_path;
 
-/* The n-th part of a list. */
+// The n-th part of a list.
 static const char* part(const char* list, int n, char* buffer, size_t size) {
   for (; list && n > 0; --n) {
     list = strchr(list, ',');
@@ -56,7 +55,7 @@ static const char* part(const char* list, int n, char* buffer, size_t size) {
   return buffer;
 }
 
-static void read_settings(void) {
+__attribute__((constructor)) static void begin(void) {
   char buffer[64];
   const char *word, *who = getenv("FAULT_WHO");
   counts_path = getenv("FAULT_COUNTS");
@@ -73,11 +72,8 @@ static void read_settings(void) {
     fault->kills = word && strcmp(word, "kill") == 0;
     fault->is_short = word && strcmp(word, "short") == 0;
   }
-  sticks = getenv("FAULT_STICKS") != NULL;
-  unsetenv("LD_PRELOAD"); /* the tools that it runs are left alone */
+  unsetenv("LD_PRELOAD"); // the tools that it runs are left alone
 }
-
-__attribute__((constructor)) static void begin(void) { read_settings(); }
 
 __attribute__((destructor)) static void end(void) {
   if (!counts_path || generation != 0) return;
@@ -89,14 +85,13 @@ __attribute__((destructor)) static void end(void) {
   close_stream(out);
 }
 
-/* Whether this call is one that goes wrong. */
+// Whether this call is one that goes wrong.
 static int goes_wrong(enum Call call) {
   if (generation != faulty_generation) return 0;
   const long number = atomic_fetch_add(&counts[call], 1) + 1;
   for (int i = 0; i < fault_count; ++i) {
     const struct Fault* fault = &faults[i];
-    if (fault->call != (int)call || fault->at <= 0) continue;
-    if (number != fault->at && !(sticks && number > fault->at)) continue;
+    if (fault->call != (int)call || fault->at != number) continue;
     if (fault->kills) kill(getpid(), SIGKILL);
     error_number = fault->error;
     is_short = fault->is_short;
@@ -105,197 +100,100 @@ static int goes_wrong(enum Call call) {
   return 0;
 }
 
-#define REAL(result, name, ...)                                    \
-  static result (*real)(__VA_ARGS__);                              \
-  if (!real) real = (result (*)(__VA_ARGS__))dlsym(RTLD_NEXT, name)
+// The function that the program would have called.
+#define REAL(type, name, parameters)                               \
+  static type (*real) parameters;                                  \
+  if (!real) real = (type (*) parameters)dlsym(RTLD_NEXT, #name)
 
-#define FAILS(call, result)        \
-  if (goes_wrong(call)) {          \
-    errno = error_number;          \
-    return result;                 \
+// A function whose calls fail with `result`, or end short with `half` in place of their arguments.
+#define SHORTENED(type, name, call, result, parameters, arguments, half) \
+  type name parameters {                                                 \
+    REAL(type, name, parameters);                                        \
+    if (!goes_wrong(call)) return real arguments;                        \
+    if (is_short) return real half;                                      \
+    errno = error_number;                                                \
+    return result;                                                       \
   }
+#define FAILING(type, name, call, result, parameters, arguments) SHORTENED(type, name, call, result, parameters, arguments, arguments)
 
-static mode_t mode_of(int flags, va_list rest) { return flags & (O_CREAT | O_TMPFILE) ? va_arg(rest, mode_t) : 0; }
+FAILING(int, stat, STAT, -1, (const char* path, struct stat* out), (path, out))
+FAILING(int, stat64, STAT, -1, (const char* path, struct stat64* out), (path, out))
+FAILING(int, lstat, STAT, -1, (const char* path, struct stat* out), (path, out))
+FAILING(int, fstat, STAT, -1, (int fd, struct stat* out), (fd, out))
+FAILING(int, fstatat, STAT, -1, (int folder, const char* path, struct stat* out, int flags), (folder, path, out, flags))
+FAILING(int, rename, RENAME, -1, (const char* from, const char* to), (from, to))
+FAILING(int, unlink, UNLINK, -1, (const char* path), (path))
+FAILING(int, mkdir, MKDIR, -1, (const char* path, mode_t mode), (path, mode))
+FAILING(int, chmod, CHMOD, -1, (const char* path, mode_t mode), (path, mode))
+FAILING(int, utimensat, UTIME, -1, (int folder, const char* path, const struct timespec times[2], int flags), (folder, path, times, flags))
+FAILING(DIR*, opendir, OPENDIR, NULL, (const char* path), (path))
+FAILING(struct dirent*, readdir, READDIR, NULL, (DIR* folder), (folder))
+FAILING(FILE*, fopen, FOPEN, NULL, (const char* path, const char* mode), (path, mode))
+FAILING(FILE*, fopen64, FOPEN, NULL, (const char* path, const char* mode), (path, mode))
+FAILING(ssize_t, send, SEND, -1, (int socket, const void* data, size_t size, int flags), (socket, data, size, flags))
+FAILING(ssize_t, sendmsg, SEND, -1, (int socket, const struct msghdr* message, int flags), (socket, message, flags))
+FAILING(ssize_t, recv, RECV, -1, (int socket, void* data, size_t size, int flags), (socket, data, size, flags))
+FAILING(ssize_t, recvmsg, RECV, -1, (int socket, struct msghdr* message, int flags), (socket, message, flags))
+SHORTENED(ssize_t, read, READ, -1, (int fd, void* data, size_t size), (fd, data, size), (fd, data, size / 2))
+SHORTENED(size_t, fwrite, FWRITE, 0, (const void* data, size_t size, size_t count, FILE* stream), (data, size, count, stream),
+          (data, size, count / 2, stream))
 
-#define DEFINE_OPEN(name)                              \
-  int name(const char* path, int flags, ...) {         \
-    REAL(int, #name, const char*, int, ...);           \
-    va_list rest;                                      \
-    va_start(rest, flags);                             \
-    const mode_t mode = mode_of(flags, rest);          \
-    va_end(rest);                                      \
-    FAILS(OPEN, -1)                                    \
-    return real(path, flags, mode);                    \
+ssize_t write(int fd, const void* data, size_t size) {
+  REAL(ssize_t, write, (int, const void*, size_t));
+  if (fd <= STDERR_FILENO || !goes_wrong(WRITE)) return real(fd, data, size);
+  if (is_short) return real(fd, data, size / 2);
+  errno = error_number;
+  return -1;
+}
+
+#define DEFINE_OPEN(name)                                                              \
+  int name(const char* path, int flags, ...) {                                         \
+    REAL(int, name, (const char*, int, ...));                                          \
+    va_list rest;                                                                      \
+    va_start(rest, flags);                                                             \
+    const mode_t mode = flags & (O_CREAT | O_TMPFILE) ? va_arg(rest, mode_t) : 0;      \
+    va_end(rest);                                                                      \
+    if (!goes_wrong(OPEN)) return real(path, flags, mode);                             \
+    errno = error_number;                                                              \
+    return -1;                                                                         \
   }
 DEFINE_OPEN(open)
 DEFINE_OPEN(open64)
 
-ssize_t read(int fd, void* data, size_t size) {
-  REAL(ssize_t, "read", int, void*, size_t);
-  if (goes_wrong(READ)) {
-    if (is_short) return real(fd, data, size / 2);
-    errno = error_number;
-    return -1;
-  }
-  return real(fd, data, size);
-}
-
-ssize_t write(int fd, const void* data, size_t size) {
-  REAL(ssize_t, "write", int, const void*, size_t);
-  if (fd > STDERR_FILENO && goes_wrong(WRITE)) {
-    if (is_short) return real(fd, data, size / 2);
-    errno = error_number;
-    return -1;
-  }
-  return real(fd, data, size);
-}
-
-int close(int fd) { /* closes all the same, as the system does */
-  REAL(int, "close", int);
+int close(int fd) {  // closes all the same, as the system does
+  REAL(int, close, (int));
   const int result = real(fd);
-  FAILS(CLOSE, -1)
-  return result;
+  if (!goes_wrong(CLOSE)) return result;
+  errno = error_number;
+  return -1;
 }
 
-#define DEFINE_STAT(name, type)                 \
-  int name(const char* path, struct type* out) { \
-    REAL(int, #name, const char*, struct type*); \
-    FAILS(STAT, -1)                              \
-    return real(path, out);                      \
-  }
-DEFINE_STAT(stat, stat)
-DEFINE_STAT(stat64, stat64)
-DEFINE_STAT(lstat, stat)
-
-int fstat(int fd, struct stat* out) {
-  REAL(int, "fstat", int, struct stat*);
-  FAILS(STAT, -1)
-  return real(fd, out);
+int fflush(FILE* stream) {  // what was buffered is lost
+  REAL(int, fflush, (FILE*));
+  if (!goes_wrong(FFLUSH)) return real(stream);
+  __fpurge(stream);
+  errno = error_number;
+  return EOF;
 }
 
-int fstatat(int folder, const char* path, struct stat* out, int flags) {
-  REAL(int, "fstatat", int, const char*, struct stat*, int);
-  FAILS(STAT, -1)
-  return real(folder, path, out, flags);
-}
-
-int rename(const char* from, const char* to) {
-  REAL(int, "rename", const char*, const char*);
-  FAILS(RENAME, -1)
-  return real(from, to);
-}
-
-int unlink(const char* path) {
-  REAL(int, "unlink", const char*);
-  FAILS(UNLINK, -1)
-  return real(path);
-}
-
-int mkdir(const char* path, mode_t mode) {
-  REAL(int, "mkdir", const char*, mode_t);
-  FAILS(MKDIR, -1)
-  return real(path, mode);
-}
-
-int chmod(const char* path, mode_t mode) {
-  REAL(int, "chmod", const char*, mode_t);
-  FAILS(CHMOD, -1)
-  return real(path, mode);
-}
-
-int utimensat(int folder, const char* path, const struct timespec times[2], int flags) {
-  REAL(int, "utimensat", int, const char*, const struct timespec*, int);
-  FAILS(UTIME, -1)
-  return real(folder, path, times, flags);
-}
-
-DIR* opendir(const char* path) {
-  REAL(DIR*, "opendir", const char*);
-  FAILS(OPENDIR, NULL)
-  return real(path);
-}
-
-struct dirent* readdir(DIR* folder) {
-  REAL(struct dirent*, "readdir", DIR*);
-  FAILS(READDIR, NULL)
-  return real(folder);
-}
-
-#define DEFINE_FOPEN(name)                              \
-  FILE* name(const char* path, const char* mode) {      \
-    REAL(FILE*, #name, const char*, const char*);       \
-    FAILS(FOPEN, NULL)                                  \
-    return real(path, mode);                            \
-  }
-DEFINE_FOPEN(fopen)
-DEFINE_FOPEN(fopen64)
-
-size_t fwrite(const void* data, size_t size, size_t count, FILE* stream) {
-  REAL(size_t, "fwrite", const void*, size_t, size_t, FILE*);
-  if (goes_wrong(FWRITE)) {
-    if (is_short) return real(data, size, count / 2, stream);
-    errno = error_number;
-    return 0;
-  }
-  return real(data, size, count, stream);
-}
-
-int fflush(FILE* stream) { /* what was buffered is lost */
-  REAL(int, "fflush", FILE*);
-  if (goes_wrong(FFLUSH)) {
-    __fpurge(stream);
-    errno = error_number;
-    return EOF;
-  }
-  return real(stream);
-}
-
-int fclose(FILE* stream) { /* closes all the same; what was buffered is lost */
-  REAL(int, "fclose", FILE*);
-  const int wrong = goes_wrong(FCLOSE);
-  if (wrong) __fpurge(stream);
-  const int result = real(stream);
-  if (!wrong) return result;
+int fclose(FILE* stream) {  // closes all the same; what was buffered is lost
+  REAL(int, fclose, (FILE*));
+  if (!goes_wrong(FCLOSE)) return real(stream);
+  __fpurge(stream);
+  real(stream);
   errno = error_number;
   return EOF;
 }
 
 pid_t fork(void) {
-  REAL(pid_t, "fork", void);
-  FAILS(FORK, -1)
+  REAL(pid_t, fork, (void));
+  if (goes_wrong(FORK)) {
+    errno = error_number;
+    return -1;
+  }
   const pid_t child = real();
   if (child == 0) ++generation;
   return child;
 }
 
-pid_t vfork(void) { return fork(); } /* a function that is called in between could not return into the caller twice */
-
-ssize_t send(int socket, const void* data, size_t size, int flags) {
-  REAL(ssize_t, "send", int, const void*, size_t, int);
-  FAILS(SEND, -1)
-  return real(socket, data, size, flags);
-}
-
-ssize_t sendmsg(int socket, const struct msghdr* message, int flags) {
-  REAL(ssize_t, "sendmsg", int, const struct msghdr*, int);
-  FAILS(SEND, -1)
-  return real(socket, message, flags);
-}
-
-ssize_t recvmsg(int socket, struct msghdr* message, int flags) {
-  REAL(ssize_t, "recvmsg", int, struct msghdr*, int);
-  FAILS(RECV, -1)
-  return real(socket, message, flags);
-}
-
-ssize_t recv(int socket, void* data, size_t size, int flags) {
-  REAL(ssize_t, "recv", int, void*, size_t, int);
-  FAILS(RECV, -1)
-  return real(socket, data, size, flags);
-}
-
-pid_t waitpid(pid_t process, int* status, int flags) {
-  REAL(pid_t, "waitpid", pid_t, int*, int);
-  FAILS(WAITPID, -1)
-  return real(process, status, flags);
-}
+pid_t vfork(void) { return fork(); }  // a function that is called in between could not return into the caller twice

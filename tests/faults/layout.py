@@ -2,16 +2,12 @@
 by the next call."""
 
 import errno
-import os
 import shutil
 import subprocess
 
+from workspaces import run
+
 KINDS = {"--init": ["zoo"], "--init, in a folder": ["zoo", "."]}
-
-
-def run(binary, folder, arguments, **environment):
-    return subprocess.run([binary, "--init", *arguments], cwd=folder, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
-                          stderr=subprocess.STDOUT, timeout=60, env={**os.environ, **environment})
 
 
 def contents(folder):
@@ -21,7 +17,7 @@ def contents(folder):
 def disturbed(binary, library, folder, arguments, expected, call, at, how, number):
     folder.mkdir()
     try:
-        done = run(binary, folder, arguments, LD_PRELOAD=library, FAULT_CALL=call, FAULT_AT=str(at), FAULT_HOW=how,
+        done = run(binary, folder, "--init", *arguments, LD_PRELOAD=library, FAULT_CALL=call, FAULT_AT=str(at), FAULT_HOW=how,
                    FAULT_ERRNO=str(number))
         place = f"{call} {at} {how} {errno.errorcode.get(number, '')}: "
         if how != "kill" and done.returncode not in (0, 1):
@@ -31,7 +27,7 @@ def disturbed(binary, library, folder, arguments, expected, call, at, how, numbe
         if done.returncode == 1 and b"rror" not in done.stdout:
             return place + f"without a message: {done.stdout}"
         if done.returncode != 0:
-            again = run(binary, folder, arguments)
+            again = run(binary, folder, "--init", *arguments)
             if contents(folder) != expected:
                 return place + f"not finished by the next call: {again.stdout.decode()[-300:]}"
         return None
@@ -46,7 +42,7 @@ def rows(binary, library, folder, faults, points):
     for name, arguments in KINDS.items():
         whole, counts = folder / "whole", folder / "counts"
         whole.mkdir()
-        run(binary, whole, arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts)).check_returncode()
+        run(binary, whole, "--init", *arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts)).check_returncode()
         expected = contents(whole)
         shutil.rmtree(whole)
         made = {call: int(count) for call, count in (line.split() for line in counts.read_text().splitlines())}

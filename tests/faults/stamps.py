@@ -6,6 +6,8 @@ import subprocess
 import time
 from pathlib import Path
 
+from workspaces import run
+
 STEP = 2  # seconds, of coarse.c
 EDITED = ("tree/zoo/zoo.h", "tree/zoo/notes.txt", "tree/app/src/more.cpp")
 COPIED = "zoo/notes.txt"  # a public file as it is
@@ -60,11 +62,11 @@ def while_copied(runs, folder, arguments):
 
 
 class Runs:
-    def __init__(self, binary, coarse, run, outputs):
-        self.binary, self.coarse, self.outputs, self._run = binary, coarse, outputs, run
+    def __init__(self, binary, coarse, outputs):
+        self.binary, self.coarse, self.outputs = binary, coarse, outputs
 
     def run(self, folder, arguments, **environment):
-        done = self._run(self.binary, folder, arguments, **environment)
+        done = run(self.binary, folder, "all.qrex", *arguments, **environment)
         if done.returncode != 0:
             raise RuntimeError(done.stdout.decode())
 
@@ -85,10 +87,3 @@ def rows(runs, start, folder, kinds, short):
         for fault, tests in faults.items():
             yield name, fault, [(disturbed, runs, start, folder / f"{test[0].__name__}{i}", *test)
                                 for i, test in enumerate(tests)]
-
-
-def build_library(folder):
-    library = folder / "coarse.so"
-    source = Path(__file__).resolve().parent / "coarse.c"
-    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, source, "-ldl"], check=True)
-    return str(library)

@@ -1,8 +1,25 @@
 """The workspaces of the campaign, with scripts that stand for compilers and linkers: an object is its source, a library or
-program is what went into it."""
+program is what went into it; and how the tool runs in them."""
+
+import os
+import subprocess
+from pathlib import Path
 
 from signals import PAUSE
 from workspace_fixture import SETTINGS
+
+
+def run(binary, folder, *arguments, **environment):
+    return subprocess.run([binary, *arguments], cwd=folder, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE,
+                          stderr=subprocess.STDOUT, timeout=60, env={**os.environ, **environment})
+
+
+def build_library(folder, name):
+    """A library to be preloaded, of a source beside this one."""
+    library = folder / f"{name}.so"
+    subprocess.run(["cc", "-shared", "-fPIC", "-O1", "-o", library, Path(__file__).resolve().parent / f"{name}.c", "-ldl"], check=True)
+    return str(library)
+
 
 # --- The gcc family
 
