@@ -1,9 +1,10 @@
 #!/usr/bin/env python3
 """Tools of this system for the Windows program: bridges.py BUILD_FOLDER COMMAND... runs a command, below which they can be called.
 
-Drive R: is a view of this system in which a bridge (bridge.cpp) stands for each program in the folders of PATH; `Qrex` beside
-this file runs the Windows program there. The bridges talk to the server here, which runs the programs."""
+Drive Z: becomes a view of this system in which a bridge (bridge.cpp) stands for each program in the folders of PATH; `Qrex` and
+`wine` beside this file run the Windows program and others there. The bridges talk to the server here, which runs the programs."""
 
+import fcntl
 import os
 import re
 import secrets
@@ -18,7 +19,7 @@ import tempfile
 import threading
 from pathlib import Path
 
-DRIVE = "R:"
+DRIVE = "Z:"
 CACHES = ["/usr/lib/ccache"]
 # What Windows programs have in their environment, which says nothing to others.
 OF_WINDOWS = re.compile(r"(?i)(all_?users|app_?data|common_?program|computername|comspec|driverdata|home|localappdata|number_of_processors"
@@ -29,7 +30,7 @@ KILLED, INTERRUPTED = 0xC0000005, 0xC000013A  # how Windows tells it
 
 def plain(text):
     """Without the drive."""
-    return re.sub(rf"(?i)\b[rz]:(?=[/\\])", "", text)
+    return re.sub(rf"(?i)\bz:(?=[/\\])", "", text)
 
 
 def unix_path(path):
@@ -200,20 +201,27 @@ class Bridges:
         self.windows, self.linux, self.bridge = windows, linux, windows / "bridge.exe"
 
     def __enter__(self):
-        self.folder = Path(tempfile.mkdtemp(prefix="bridges-"))
-        View(self.folder / "view", self.bridge, [*os.environ["PATH"].split(":"), *CACHES])
-        drive = Path(os.environ["WINEPREFIX"]) / "dosdevices" / DRIVE.lower()
+        prefix = Path(os.environ["WINEPREFIX"])
+        self.lock = open(prefix / "view.lock", "w")
+        fcntl.flock(self.lock, fcntl.LOCK_EX)  # who else calls them in this prefix waits
+        view, drive = prefix / "view", prefix / "dosdevices" / DRIVE.lower()
+        shutil.rmtree(view, ignore_errors=True)
+        View(view, self.bridge, [*os.environ["PATH"].split(":"), *CACHES])
         drive.unlink(missing_ok=True)
-        drive.symlink_to(self.folder / "view")
+        drive.symlink_to(view)
+        self.folder = Path(tempfile.mkdtemp(prefix="bridges-"))
         self.program = build_folder(self.folder / "build", self.windows, self.linux)
-        os.environ.update(QREX_BRIDGES=Server().address, QREX_BRIDGE=str(self.bridge), QREX_VIEW=str(self.folder / "view"), QREX_DRIVE=DRIVE)
+        os.environ.update(QREX_BRIDGES=Server().address, QREX_BRIDGE=str(self.bridge), QREX_VIEW=str(view), QREX_DRIVE=DRIVE,
+                          QREX_PROGRAM=str(self.program))
         return self
 
     def __exit__(self, *_):
         shutil.rmtree(self.folder, ignore_errors=True)
+        self.lock.close()
 
 
 def main():
+    os.environ.setdefault("WINEPREFIX", os.path.abspath(f"{sys.argv[1]}/wine"))
     with Bridges(Path(sys.argv[1]).resolve(), Path(__file__).resolve().parents[2] / "build"):
         sys.exit(subprocess.run(sys.argv[2:]).returncode)
 

@@ -4,7 +4,7 @@ import subprocess
 from pathlib import Path
 
 ROOT = Path(__file__).resolve().parents[2]
-WINE = "/usr/lib/wine/wine64"
+WINE = str(ROOT / "tests/windows/wine")
 WRAPPER = str(ROOT / "tests/windows/Qrex")
 
 
