@@ -33,8 +33,16 @@ CACHE = "/usr/lib/ccache"
 if os.path.isdir(CACHE):
     os.environ.update(PATH=f"{CACHE}:{os.environ['PATH']}", CCACHE_BASEDIR=tempfile.gettempdir(), CCACHE_NOHASHDIR="1")
 
-# The drive that the tool of another system puts ahead of paths, where that is what runs (tests/windows).
+# The drive of all paths, where the tool of another system runs (tests/windows).
 DRIVE = os.environ.get("QREX_DRIVE", "")
+
+
+def plain(text):
+    """What the tool of any system has told, in the words of this one."""
+    if not DRIVE:
+        return text
+    text = re.sub(r"exception 0xC0DE00(\w\w)", lambda found: f"signal {int(found[1], 16)}", text.replace("\r\n", "\n").replace(f"{DRIVE}/", "/"))
+    return re.sub(r"Return code : -(\d+)", lambda found: f"Return code : {128 + (-int(found[1]) & 0xFF)}", text)
 
 def project(kind, root, files, statements=""):
     """The text of a project that is translated, with one configuration."""
@@ -143,7 +151,7 @@ class Workspace:
         """Runs the tool; its standard output. Fails on another exit status."""
         done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900,
                               env={**os.environ, **environment})
-        self.output = done.stdout.replace(f"{DRIVE}/", "/")
+        self.output = plain(done.stdout)
         assert done.returncode == status, f"status {done.returncode}, not {status}:\n{done.stdout}{done.stderr}"
         return self.output
 
@@ -153,7 +161,7 @@ class Workspace:
         done = subprocess.run(command, shell=True, cwd=self.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
                               text=True, timeout=900, env={**os.environ, "PATH": path, **environment})
         assert done.returncode == status, f"{command}: status {done.returncode}:\n{done.stdout}"
-        return done.stdout.replace(f"{DRIVE}/", "/")
+        return plain(done.stdout)
 
     def times(self, pattern):
         """Name to modification time, of the files that the pattern matches."""
