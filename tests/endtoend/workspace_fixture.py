@@ -35,13 +35,16 @@ if os.path.isdir(CACHE):
 
 # The drive of all paths, where the tool of another system runs (tests/windows).
 DRIVE = os.environ.get("QREX_DRIVE", "")
+SENTENCES = {"Path not found.": "The system cannot find the path specified.", "Access denied.": "Access is denied.", f"{DRIVE}/": "/", "\r\n": "\n"}
 
 
 def plain(text):
     """What the tool of any system has told, in the words of this one."""
     if not DRIVE:
         return text
-    text = re.sub(r"exception 0xC0DE00(\w\w)", lambda found: f"signal {int(found[1], 16)}", text.replace("\r\n", "\n").replace(f"{DRIVE}/", "/"))
+    for theirs, ours in SENTENCES.items():
+        text = text.replace(theirs, ours)
+    text = re.sub(r"exception 0xC0DE00(\w\w)", lambda found: f"signal {int(found[1], 16)}", text)
     return re.sub(r"Return code : -(\d+)", lambda found: f"Return code : {128 + (-int(found[1]) & 0xFF)}", text)
 
 def project(kind, root, files, statements=""):
