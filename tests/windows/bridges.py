@@ -212,7 +212,8 @@ class Bridges:
         self.folder = Path(tempfile.mkdtemp(prefix="bridges-"))
         self.program = build_folder(self.folder / "build", self.windows, self.linux)
         os.environ.update(QREX_BRIDGES=Server().address, QREX_BRIDGE=str(self.bridge), QREX_VIEW=str(view), QREX_DRIVE=DRIVE,
-                          QREX_PROGRAM=str(self.program))
+                          QREX_PROGRAM=str(self.program),
+                          QREX_WINE=str(Path(__file__).with_name("wine")))
         return self
 
     def __exit__(self, *_):
