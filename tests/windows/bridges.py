@@ -42,8 +42,7 @@ class View:
 
     def __init__(self, folder, bridge, tool_folders):
         self.root, self.bridge = folder, bridge
-        folders = {os.path.realpath(each) for each in tool_folders if os.path.isdir(each)} | {each for each in tool_folders if os.path.isdir(each)}
-        self.mirror(Path("/"), {Path(each) for each in folders})
+        self.mirror(Path("/"), {Path(path) for each in tool_folders for path in (each, os.path.realpath(each))})
 
     def mirror(self, place, folders):
         target = self.root / str(place)[1:]
@@ -57,6 +56,22 @@ class View:
                 os.symlink(entry.path, target / entry.name)
                 if place in folders and entry.is_file() and os.access(entry.path, os.X_OK):
                     os.symlink(self.bridge, target / f"{entry.name}.exe")
+
+
+def current_view(prefix, bridge):
+    """The one of this prefix; made anew when programs have come, unless somebody else does so."""
+    view, drive, stamp = prefix / "view", prefix / "dosdevices" / DRIVE.lower(), prefix / "view.stamp"
+    folders = [each for each in [*os.environ["PATH"].split(":"), *CACHES] if os.path.isdir(each)]
+    with open(prefix / "view.lock", "w") as lock:
+        fcntl.flock(lock, fcntl.LOCK_EX)
+        since = os.path.getmtime(stamp) if stamp.exists() else 0
+        if any(os.path.getmtime(each) > since for each in [bridge, *folders]):
+            shutil.rmtree(view, ignore_errors=True)
+            View(view, bridge, folders)
+            stamp.touch()
+        drive.unlink(missing_ok=True)
+        drive.symlink_to(view)
+    return view
 
 
 class Request:
@@ -177,7 +192,8 @@ class Server:
 
 
 # Ahead of what this system's program is installed with its own, the Windows program and what calls it.
-INSTALL = """include("{linux}/cmake_install.cmake")
+INSTALL = """file(LOCK "{lock}")  # the runtime is gathered in one place
+include("{linux}/cmake_install.cmake")
 if(NOT CMAKE_INSTALL_COMPONENT OR CMAKE_INSTALL_COMPONENT STREQUAL "tool")
   file(INSTALL DESTINATION "${{CMAKE_INSTALL_PREFIX}}/bin" TYPE PROGRAM FILES "{wrapper}" "{windows}/Qrex.exe")
 endif()
@@ -188,7 +204,7 @@ def build_folder(folder, windows, linux):
     """As the build folder of this system, as far as tests ask for that, but with the Windows program in its place."""
     wrapper = Path(__file__).with_name("Qrex")
     folder.mkdir()
-    (folder / "cmake_install.cmake").write_text(INSTALL.format(linux=linux, windows=windows, wrapper=wrapper))
+    (folder / "cmake_install.cmake").write_text(INSTALL.format(lock=folder / "lock", linux=linux, windows=windows, wrapper=wrapper))
     for path in [wrapper, Path(windows) / "Qrex.exe", *(Path(linux) / name for name in ("built", "CPackConfig.cmake"))]:
         (folder / path.name).symlink_to(path)
     return folder / "Qrex"
@@ -201,14 +217,7 @@ class Bridges:
         self.windows, self.linux, self.bridge = windows, linux, windows / "bridge.exe"
 
     def __enter__(self):
-        prefix = Path(os.environ["WINEPREFIX"])
-        self.lock = open(prefix / "view.lock", "w")
-        fcntl.flock(self.lock, fcntl.LOCK_EX)  # who else calls them in this prefix waits
-        view, drive = prefix / "view", prefix / "dosdevices" / DRIVE.lower()
-        shutil.rmtree(view, ignore_errors=True)
-        View(view, self.bridge, [*os.environ["PATH"].split(":"), *CACHES])
-        drive.unlink(missing_ok=True)
-        drive.symlink_to(view)
+        view = current_view(Path(os.environ["WINEPREFIX"]), self.bridge)
         self.folder = Path(tempfile.mkdtemp(prefix="bridges-"))
         self.program = build_folder(self.folder / "build", self.windows, self.linux)
         os.environ.update(QREX_BRIDGES=Server().address, QREX_BRIDGE=str(self.bridge), QREX_VIEW=str(view), QREX_DRIVE=DRIVE,
@@ -218,7 +227,6 @@ class Bridges:
 
     def __exit__(self, *_):
         shutil.rmtree(self.folder, ignore_errors=True)
-        self.lock.close()
 
 
 def main():
