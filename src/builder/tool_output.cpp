@@ -144,7 +144,11 @@ class OutputScanner {
     // A compiler tells how it came to a file: from here or not, with `.` and `..` as its include paths have them.
     std::string file(message.file);
     std::replace(file.begin(), file.end(), '\\', '/');
-    if (!IsAbsolutePath(file)) file.insert(0, m_currentDirectory);
+    if (!IsAbsolutePath(file)) {
+      file.insert(0, m_currentDirectory);
+    } else if (file.front() == '/') {
+      file.insert(0, DriveOf(m_currentDirectory));  // which goes without saying
+    }
     file = CollapseDots(file);
     StripIgnoringCase(file, m_currentDirectory);
     if (!StripIgnoringCase(file, TranslationDirectory(m_builder.config))) return {};

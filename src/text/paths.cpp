@@ -41,6 +41,10 @@ bool IsAbsolutePath(std::string_view path) {
   return (!path.empty() && path[0] == '/') || (path.size() >= 4 && path[1] == ':' && path[2] == '/');
 }
 
+std::string_view DriveOf(std::string_view path) {
+  return path.substr(0, IsAbsolutePath(path) && path.front() != '/' ? path.find('/') : 0);
+}
+
 std::string_view FileNameOf(std::string_view path) {
   const size_t slash = path.rfind('/');
   return slash == std::string_view::npos ? path : path.substr(slash + 1);

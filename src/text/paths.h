@@ -11,6 +11,7 @@ namespace qrex {
 // Whether a relative path leads, by its "..", above the folder that it begins in.
 bool LeadsAbove(std::string_view path);
 bool IsAbsolutePath(std::string_view path);
+std::string_view DriveOf(std::string_view path);  // with its colon; none: empty
 std::string_view FileNameOf(std::string_view path);
 std::string FolderOf(std::string_view path);            // empty: it stands in none
 bool StemOf(std::string_view path, std::string& stem);  // false, `stem` untouched: no '.', or an empty stem

@@ -6,7 +6,7 @@ import shlex
 import shutil
 import subprocess
 
-from workspace_fixture import ROOT, Skipped, Workspace, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
+from workspace_fixture import ROOT, Skipped, Workspace, equal, holds, in_workspace, lacks, plain, project, run_tests, workspace_of
 
 EXAMPLES = {"cmake": "stock", "evolution": "evolution", "first": "first", "remote": "remote", "shapes": "geometry", "tour": "tour"}
 NAME = "compile_commands.json"
@@ -26,7 +26,7 @@ FILES = {
 
 
 def entries(workspace):
-    return json.loads(workspace.path(NAME).read_text())
+    return json.loads(plain(workspace.path(NAME).read_text()))
 
 
 def compile_all(workspace):
@@ -99,6 +99,7 @@ def test_examples(binary):
             text = workspace.path(f"{name}.qrex").read_text()
             workspace.write(f"{name}.qrex", text.replace("../../runtime", str(ROOT / "runtime")))
             workspace.run(f"{name}.qrex", "translateOnly=true", "compileCommands=true", "mode=build")
+            workspace.write(NAME, plain(workspace.path(NAME).read_text()))  # clangd is of this system
             own = {entry["file"]: entry["arguments"] for entry in entries(workspace)
                    if folder == "tour" or "/Vesk/" not in entry["file"]}
             assert own, folder

@@ -5,10 +5,12 @@ nothing else does."""
 import os
 import time
 
-from workspace_fixture import SETTINGS, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
+from workspace_fixture import DRIVE, SETTINGS, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 NAMES = ["a b.h", "c$d.h", "e#f.h", "g:h.h", "i\\j.h", "back\\ slash.h", "k%l.h", "o(p)~[q].h", "a=b.h", "s,t+u@v!w.h", "x$$y.h",
          "{curly}.h", "-minus.h", "ü.h"]
+if DRIVE:  # such names are not for every system
+    NAMES = [name for name in NAMES if not set(name) & set(":\\")]
 FILES = {
     **workspace_of("lib", "app"),
     "all.qrex": '@import "settings.inc"\n' + SETTINGS + 'translateOnly = true\ndepfile = "out/app.d"\n',

@@ -10,7 +10,7 @@ import tempfile
 import time
 from pathlib import Path
 
-from workspace_fixture import run_tests
+from workspace_fixture import plain, run_tests
 
 BINARY = os.path.abspath(sys.argv[1])
 CONFIG = '''virtualTree = { "tree" }
@@ -69,7 +69,7 @@ def write_tree(changes={}, age=3600):
 def run(*arguments, status=0):
     """Runs the tool; what it printed."""
     done = subprocess.run([BINARY, *(arguments or ['main.qrex'])], stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=60)
-    text = done.stdout.decode(errors='replace')
+    text = plain(done.stdout.decode(errors='replace'))
     assert done.returncode == status, f'status {done.returncode}, not {status}, of {arguments}:\n{text}'
     return text
 

@@ -12,7 +12,7 @@ import time
 from run_fixture import (BINARY, CONFIG, HEAD, PROJECT, DEPENDENCIES, TRANSLATED, EACH_RUN, JUNK, write, read,
                          write_tree, run, expect, files_of, leftovers, contents, times, changed, is_read_only, edit,
                          run_named)
-from workspace_fixture import holds, lacks
+from workspace_fixture import DRIVE, holds, lacks
 
 
 # --- Modes
@@ -190,7 +190,7 @@ def test_parallel_build():
           'Parallel build with devenv....')
     expect(read('log') == b'tools:/bin ' + command[8:].replace('"', '').encode() + b'\n', read('log'))
     text = run('*all.sln', 'compiler=vc9', 'mode=gen')
-    holds(text, '\ndevenv build_all.sln /Build "Debug|x64"\n', 'failed with error code 127\n')
+    holds(text, '\ndevenv build_all.sln /Build "Debug|x64"\n', f'failed with error code {9009 if DRIVE else 127}\n')
 
 
 # --- Bad input: an orderly end with status 1, the place, and what is wrong
@@ -289,6 +289,8 @@ def test_standard_output_that_takes_nothing():
     shutil.rmtree('out')
     expect(subprocess.run(f'"{BINARY}" main.qrex diagnostics=true >&-', shell=True).returncode == 0, 'closed')
     expect(without_times(contents('qrexsource', 'out')) == wanted, 'what was printed stands in a file')
+    if DRIVE:
+        return  # not every system has pipes that do not block
     # a pipe that is full for a while and does not block
     reading, writing = os.pipe()
     os.set_blocking(writing, False)

@@ -7,7 +7,7 @@ import signal
 import subprocess
 import time
 
-from workspace_fixture import SETTINGS, Workspace, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
+from workspace_fixture import DRIVE, SETTINGS, Workspace, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 PROJECT = "tree/app/src/app.qrpj"
 FILES = {**workspace_of("app"), "tree/app/src/a.cpp": "int main() { return 0; }\n",
@@ -20,7 +20,7 @@ def searching(pattern, **files):
 
 
 # Names that the shell would run, or end a word at; each would leave a file behind.
-NAMES = ["$(touch RAN)", "`touch RAN`", "a;touch RAN;b", "a&touch RAN&", "$HOME", "a' b", "a, b", "~", "a*", "-x", "@x"]
+NAMES = ["$(touch RAN)", "`touch RAN`", "a;touch RAN;b", "a&touch RAN&", "$HOME", "a' b", "a, b", "~", *([] if DRIVE else ["a*"]), "-x", "@x"]
 
 
 def test_names_do_not_run(binary):
@@ -76,6 +76,8 @@ def test_a_quote_in_a_name_is_refused(binary):
     for path, text, place, name in changes:
         with Workspace(binary, {**FILES, path: text}) as workspace:
             holds(workspace.run("all.qrex", status=1), place + "A double quote can't stand in " + name)
+    if DRIVE:  # no file has such a name
+        return
     with Workspace(binary, searching('"*.cpp"', **{'tree/app/src/b"b.cpp': ""})) as workspace:
         holds(workspace.run("all.qrex", status=1), "A double quote can't stand in app/src/b\"b.cpp")
 
@@ -93,7 +95,8 @@ def test_builds_in_one_folder_follow_each_other(workspace):
     while not workspace.path("busy").exists():
         assert first.poll() is None, first.stdout.read()
         time.sleep(0.01)
-    holds(workspace.run("all.qrex"), f"Waiting for process {first.pid}, which builds in this folder\n", "\nCompleted..")
+    other = "another process" if DRIVE else f"process {first.pid}"
+    holds(workspace.run("all.qrex"), f"Waiting for {other}, which builds in this folder\n", "\nCompleted..")
     lacks(first.communicate()[0], "error")
     assert first.returncode == 0
     lacks(workspace.run("all.qrex", "translateOnly=true"), "Waiting")
@@ -138,14 +141,15 @@ def test_writes_beyond_the_limit_of_file_sizes_fail(workspace):
     holds(output, "Error: File error (qrexsource/x64/Debug/app/src/a.cpp) : The file size exceeds the limit allowed")
 
 
-IMPORTS = 10000
+IMPORTS = 2000 if DRIVE else 10000  # in the folders of Wine each file is searched for
 
 
 @in_workspace(lambda: searching('"*.h" "a.cpp"', **{
     "tree/app/src/a.cpp": '@import "h0.h"\n', f"tree/app/src/h{IMPORTS}.h": "",
     **{f"tree/app/src/h{i}.h": f'@import "h{i + 1}.h"\n' for i in range(IMPORTS)}}))
 def test_a_long_chain_of_imports_works_or_is_refused(workspace):
-    output = workspace.shell("(ulimit -v 300000; Qrex all.qrex translateOnly=true) || echo status $?")
+    limit = "" if DRIVE else "ulimit -v 300000; "
+    output = workspace.shell(f"({limit}Qrex all.qrex translateOnly=true) || echo status $?")
     if "status" in output and "AddressSanitizer failed to allocate" not in output:  # whose own memory is above the limit
         holds(output, ".h(1) : error : ", " nested too deeply\n", "status 1\n")
     for _ in range(2):
@@ -168,7 +172,7 @@ def test_links_are_replaced_and_not_written_through(workspace):
     elsewhere.chmod(0o444)
     outputs = [workspace.path(name) for name in ("qrexsource/x64/Debug/app/src/a.cpp", "qrexsource/x64/Debug/app.qrexdep",
                                                  "x64/Debug/app/a.o", "out/lib/x64/Debug/app", "out/source/app/src/app.qrpj")]
-    for link in (os.symlink, os.link):
+    for link in (os.link,) if DRIVE else (os.symlink, os.link):
         for output in outputs:
             output.unlink()
             link(elsewhere, output)

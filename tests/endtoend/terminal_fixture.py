@@ -3,14 +3,21 @@
 import fcntl
 import os
 import pty
+import re
 import struct
 import subprocess
 import termios
+
+from workspace_fixture import DRIVE
+
+WIDE = 250  # what shows the console of another system wraps lines by itself, and moves the cursor
 
 
 def on_terminal(command, folder, columns=80, until=None, kill=None, **environment):
     """What the command writes to a terminal, and its exit status. `until`: bytes, behind which the signal `kill` is sent.
     A variable of the environment that is None is left out."""
+    if DRIVE:
+        columns = max(columns, WIDE)
     terminal, its_end = pty.openpty()
     fcntl.ioctl(its_end, termios.TIOCSWINSZ, struct.pack("HHHH", 24, columns, 0, 0))
     variables = {name: value for name, value in {**os.environ, "TERM": "xterm", **environment}.items() if value is not None}
@@ -27,4 +34,5 @@ def on_terminal(command, folder, columns=80, until=None, kill=None, **environmen
             os.kill(process.pid, kill)
             until = None
     os.close(terminal)
-    return output.decode().replace("\r\n", "\n"), process.wait(timeout=60)
+    text = output.decode().replace("\r\n", "\n")
+    return re.sub(r"\x1b\[(\?25[lh]|K|m)", "", text) if DRIVE else text, process.wait(timeout=60)

@@ -5,7 +5,7 @@ import os
 import subprocess
 import time
 
-from workspace_fixture import equal, holds, in_workspace, lacks, project, run_tests, workspace_of
+from workspace_fixture import DRIVE, equal, holds, in_workspace, lacks, project, run_tests, workspace_of
 
 OUT = "qrexsource/x64/Debug/app/src/"
 FILES = {
@@ -66,7 +66,7 @@ def test_there_and_back(workspace):
 def test_filter_forms(workspace):
     """All forms of positions, several in a line; whatever else stands there comes out byte for byte."""
     workspace.run("all.qrex")
-    folder = str(workspace.folder.resolve())
+    folder = DRIVE + str(workspace.folder.resolve())
     at = line_with(workspace, OUT + "app.cpp", "local")
     there, back = f"{OUT}app.cpp", "tree/app/src/app.cpp"
     x = line_with(workspace, OUT + "x (1).h", "int y")

@@ -38,6 +38,19 @@ if os.path.isdir(CACHE):
 # A line of the command line: these compilers also where the settings name others.
 CACHED = f'PATH("x64") = {{ "{CACHE}" "/usr/bin" "/bin" }}'
 
+# The drive of all paths, where the tool of another system runs (tests/windows).
+DRIVE = os.environ.get("QREX_DRIVE", "")
+SENTENCES = {"Path not found.": "The system cannot find the path specified.", "Access denied.": "Access is denied.", f"{DRIVE}/": "/", "\r\n": "\n"}
+
+
+def plain(text):
+    """What the tool of any system has told, in the words of this one."""
+    if not DRIVE:
+        return text
+    for theirs, ours in SENTENCES.items():
+        text = text.replace(theirs, ours)
+    text = re.sub(r"exception 0xC0DE00(\w\w)", lambda found: f"signal {int(found[1], 16)}", text)
+    return re.sub(r"Return code : -(\d+)", lambda found: f"Return code : {128 + (-int(found[1]) & 0xFF)}", text)
 
 def project(kind, root, files, statements=""):
     """The text of a project that is translated, with one configuration."""
@@ -149,9 +162,9 @@ class Workspace:
         """Runs the tool; its standard output. Fails on another exit status."""
         done = subprocess.run([self.binary, *arguments], cwd=self.folder, capture_output=True, text=True, timeout=900,
                               env={**os.environ, **environment})
-        self.output = done.stdout
+        self.output = plain(done.stdout)
         assert done.returncode == status, f"status {done.returncode}, not {status}:\n{done.stdout}{done.stderr}"
-        return done.stdout
+        return self.output
 
     def shell(self, command, status=0, **environment):
         """Runs a shell command with the tool on PATH as `Qrex`; its output."""
@@ -159,7 +172,7 @@ class Workspace:
         done = subprocess.run(command, shell=True, cwd=self.folder, stdout=subprocess.PIPE, stderr=subprocess.STDOUT,
                               text=True, timeout=900, env={**os.environ, "PATH": path, **environment})
         assert done.returncode == status, f"{command}: status {done.returncode}:\n{done.stdout}"
-        return done.stdout
+        return plain(done.stdout)
 
     def times(self, pattern):
         """Name to modification time, of the files that the pattern matches."""

@@ -28,8 +28,7 @@ def files(folder):
 
 
 def masked(data, folder):
-    for root in (f"Z:{folder}", str(folder)):
-        data = data.replace(root.encode(), b"ROOT")
+    data = re.sub(rb"([A-Z]:)?" + re.escape(str(folder).encode()), b"ROOT", data)
     return TIMES.sub(b"TIME", data)
 
 

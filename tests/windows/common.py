@@ -4,7 +4,7 @@ import subprocess
 from pathlib import Path
 
 ROOT = Path(__file__).resolve().parents[2]
-WINE = "/usr/lib/wine/wine64"
+WINE = str(ROOT / "tests/windows/wine")
 WRAPPER = str(ROOT / "tests/windows/Qrex")
 
 
@@ -23,13 +23,17 @@ class Count:
         self.skipped.append(label)
         print(f"skipped {label}: {reason}", flush=True)
 
-    def end(self):
-        print(f"== {self.name}: {self.passed} passed, {len(self.failed)} failed, {len(self.skipped)} skipped", flush=True)
+    def end(self, seconds):
+        print(f"== {self.name}: {self.passed} passed, {len(self.failed)} failed, {len(self.skipped)} skipped, in {seconds:.0f} s", flush=True)
 
 
 def run(command, **options):
-    return subprocess.run(command, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=590,
-                          **options)
+    """What takes too long has failed."""
+    try:
+        return subprocess.run(command, stdin=subprocess.DEVNULL, stdout=subprocess.PIPE, stderr=subprocess.STDOUT, timeout=590,
+                              **options)
+    except subprocess.TimeoutExpired as late:
+        return subprocess.CompletedProcess(command, 1, (late.stdout or b"") + b"\nIt took too long.\n")
 
 
 def text_of(done):

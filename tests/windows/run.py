@@ -14,12 +14,11 @@ from concurrent.futures import ThreadPoolExecutor
 from pathlib import Path
 
 import compiled
+from bridges import Bridges
 from common import ROOT, WINE, WRAPPER, Count, run, text_of
 
 SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll", "rpcrt4.dll", "shell32.dll"}
-# End-to-end scripts of which tests need no compiler or shell in the run itself.
-SCRIPTS = ["init", "language", "messages", "questions", "schemas"]
-# What cannot pass under Wine, with the reason.
+# What cannot pass under Wine, with the reason: single tests, whole scripts, cases.
 KNOWN = dict(line.split(None, 1) for line in (ROOT / "tests/windows/skipped.txt").read_text().splitlines()
              if line and not line.startswith("#"))
 
@@ -167,65 +166,59 @@ def tests_of(script):
     return re.findall(r"^def (test_\w+)", script.read_text(), re.M)
 
 
-def scripts():
-    count = Count("end-to-end tests")
-    for script in sorted((ROOT / "tests/endtoend").glob("*_test.py")):
-        name = script.stem.removesuffix("_test")
-        tests = tests_of(script)
-        if name not in SCRIPTS:
-            count.skipped += [f"{name}.{test}" for test in tests]
-            print(f"skipped {name}, {len(tests)} tests: they call tools of this system, or ask it for what POSIX has", flush=True)
-            continue
-        for test in tests:
-            label = f"{name}.{test}"
-            if label in KNOWN:
-                count.skip(label, KNOWN[label])
-                continue
-            done = run([sys.executable, str(script), WRAPPER, test])
-            told = re.search(r"(\d+) passed, 0 failed", text_of(done))
-            if told and told[1] == "0":
-                count.skip(label, text_of(done).split("\n")[0])
-            else:
-                count.take(label, None if told else text_of(done)[-3000:])
-    return count
-
-
-def cases(folder):
-    count = Count("cases")
-
-    def play(path):
-        label = str(path.relative_to(folder).with_suffix(""))
-        text = path.read_text(errors="replace")
-        if label in KNOWN:
-            return label, KNOWN[label], None
-        if "#!/bin/sh" in text or "#!/bin/bash" in text:
-            return label, "its tools are shell scripts", None
-        if re.search(r"@(run|eval)?python", text):
-            return label, "no python27.dll", None
-        done = run([sys.executable, str(folder / "run.py"), "--bin", WRAPPER, "--case", label])
-        return label, None, text_of(done) if done.returncode else ""
+def at_twos(count, play, labels):
+    """Two at once; what cannot pass is not tried, what lacks something here says so."""
+    def play_unless_known(label):
+        reason = KNOWN.get(label) or KNOWN.get(label.partition(".")[0])
+        return (label, reason, None) if reason else (label, *play(label))
     with ThreadPoolExecutor(2) as pool:
-        for label, reason, failure in pool.map(play, sorted(folder.rglob("*.case"))):
+        for label, reason, failure in pool.map(play_unless_known, labels):
             if reason:
                 count.skip(label, reason)
             else:
-                count.take(label, failure or None)
+                count.take(label, failure)
     return count
+
+
+def play_test(label, program):
+    name, test = label.split(".")
+    text = text_of(run([sys.executable, str(ROOT / f"tests/endtoend/{name}_test.py"), str(program), test]))
+    told = re.search(r"(\d+) passed, 0 failed", text)
+    if told and told[1] == "0":
+        return text.split("\n")[0], None
+    return None, None if told else text[-3000:]
+
+
+def scripts(program):
+    labels = [f"{script.stem.removesuffix('_test')}.{test}" for script in sorted((ROOT / "tests/endtoend").glob("*_test.py"))
+              for test in tests_of(script)]
+    return at_twos(Count("end-to-end tests"), lambda label: play_test(label, program), labels)
+
+
+def cases(folder):
+    def play_case(label):
+        done = run([sys.executable, str(folder / "run.py"), "--bin", WRAPPER, "--case", label])
+        return None, text_of(done) if done.returncode else None
+    labels = [str(path.relative_to(folder).with_suffix("")) for path in sorted(folder.rglob("*.case"))]
+    return at_twos(Count("cases"), play_case, labels)
 
 
 def main():
     build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
     os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
-    groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples,
-              compiled.runtime, lambda: builds(build), scripts]
-    if len(sys.argv) > 3 and sys.argv[3]:
-        groups.append(lambda: cases(Path(sys.argv[3]).resolve()))
+    folder = sys.argv[3] if len(sys.argv) > 3 else ""
     counts = []
-    for group in groups:
-        counts.append(group())
-        counts[-1].end()
+    with Bridges(build, Path(binary).parent) as bridges:
+        groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples, compiled.runtime,
+                  lambda: builds(build), lambda: scripts(bridges.program)]
+        if folder:
+            groups.append(lambda: cases(Path(folder).resolve()))
+        for group in groups:
+            begin = time.monotonic()
+            counts.append(group())
+            counts[-1].end(time.monotonic() - begin)
     total = [sum(part) for part in zip(*((c.passed, len(c.failed), len(c.skipped)) for c in counts))]
-    print(f"{total[0]} passed, {total[1]} failed, {total[2]} skipped")
+    print(f"{total[0]} passed, {total[1]} failed, {total[2]} skipped: {100 * sum(total[:2]) // sum(total)} % were run")
     sys.exit(1 if total[1] else 0)
 
 

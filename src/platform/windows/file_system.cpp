@@ -289,9 +289,9 @@ Result RealPath(const std::string& path, std::string& out) {
   std::wstring real(GetFinalPathNameByHandleW(file.Get(), nullptr, 0, FILE_NAME_NORMALIZED), L'\0');
   real.resize(
       GetFinalPathNameByHandleW(file.Get(), real.data(), static_cast<DWORD>(real.size()), FILE_NAME_NORMALIZED));
-  if (real.empty()) return FullPath(path, out);  // a drive that others serve may not tell
   out = PathFrom(real);
-  return {};
+  const bool isPlace = out.starts_with("//") || (out.size() > 1 && out[1] == ':');
+  return isPlace ? Result() : FullPath(path, out);  // others may not tell, or a name that only the system can open
 }
 
 namespace {
