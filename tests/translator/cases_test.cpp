@@ -4,7 +4,8 @@
 // texts of `dll_` are whole; others are expected without the lines around each header, and with tables and traits on
 // one line.
 //
-// `scripts/test --update` writes what is expected anew, and shows what changed. What is told of headers stands in `told`.
+// `scripts/test --update` writes what is expected anew, and shows what changed. What is told of headers stands in
+// `told`.
 #include <cstdlib>
 #include <filesystem>
 
