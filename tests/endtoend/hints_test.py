@@ -75,6 +75,7 @@ CASES = [
     ({"tree/all.qrws": '"all" { "cor" }'}, [], ["not found as tree/cor/src/cor.qrpj, more/cor/src/cor.qrpj" + HERE]),
     ({"tree/app/src/app.cpp": None}, [], [LISTED, LEFT_OUT + "tool"]),
     (source('@import "core.h"'), [], ["no project lists tool/src/core.h or core.h or tool/core.h"]),
+    ({"main.qrex": '@import "x.inc"'}, [], ["not found as x.inc; virtualTree has no roots" + HERE]),
     ({"tree/all.qrws": '@import "x.inc"\n"all" { }'}, [], ["not found as x.inc, tree/x.inc, more/x.inc" + HERE]),
     # Invalid words, in the file and on the command line.
     ({"main.qrex": "mode = biuld"}, [], [MODES]),
