@@ -1,7 +1,9 @@
 #include "builder/times_ahead.h"
 
 #include <algorithm>
+#include <optional>
 #include <system_error>
+#include <utility>
 
 #include "platform/system.h"
 
@@ -44,13 +46,16 @@ void TimesAhead::Begin() {
 }
 
 void TimesAhead::ReadOn(size_t last) {
-  Folders folders;
+  std::optional<Folders> folders;
+  const Entry* entry = nullptr;
   while (!m_isOver) {
     size_t next = m_next;
     while (next < last && !m_next.compare_exchange_weak(next, next + 1)) {
     }
     if (next >= last) return;
-    Read(m_chunks[next], folders);
+    Chunk& chunk = m_chunks[next];
+    if (std::exchange(entry, chunk.entry) != chunk.entry) folders.emplace();
+    Read(chunk, *folders);
   }
 }
 

@@ -58,7 +58,7 @@ class TimesAhead {
   };
 
   struct Folders {
-    FileTimes sources, translations, objects;  // each thread goes through few at a time
+    FileTimes sources, translations, objects;  // open, of the project that a thread is at: descriptors are few
   };
 
   void ReadOn(size_t last);  // chunks that nobody has begun, up to that one
