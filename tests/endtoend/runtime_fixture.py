@@ -11,7 +11,7 @@ TOUR = ROOT / "examples" / "tour"
 # Tests that need no other command use this one: the first of them leaves the library's object in the cache.
 PLAIN = "g++ -std=c++17 -Wall -Werror -fPIC -fno-gnu-unique"
 # The sources of the library.
-LIBRARY = ("vxObject", "graph", "values")
+LIBRARY = ("vxObject", "values")
 
 
 def copy(binary, tree, workspace_file, keys):
