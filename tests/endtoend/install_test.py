@@ -87,11 +87,11 @@ def test_moved(prefix, work):
     shutil.move(prefix, tool)
     shutil.copytree(work / "zoo", checkout)
     shutil.rmtree(work / "zoo")
-    for argument, graph in (("runtime=built", False), ("runtime=source", True), ('config="Profile"', True)):
+    for argument, compiled in (("runtime=built", False), ("runtime=source", True), ('config="Profile"', True)):
         status = 1 if "Profile" in argument else 0  # a configuration that neither has
         output = qrex(tool, checkout, "zoo.qrex", "translateOnly=true", argument, status=status)
-        equal("[prepackaged" in output, not graph)
-        equal(any(checkout.glob("qrexsource/x64/*/Vesk/vxObject/src/graph.cpp")), graph)
+        equal("[prepackaged" in output, not compiled)
+        equal(any(checkout.glob("qrexsource/x64/*/Vesk/vxObject/src/values.cpp")), compiled)
     (tool / "lib/qrex/runtime/release").write_text("1.0")
     holds(qrex(tool, checkout, "zoo.qrex", status=1), "ERROR:  The runtime in ", " is of release 1.0, this tool of ")
     shutil.rmtree(tool / "lib/qrex")

@@ -4,8 +4,10 @@
 
 #include <charconv>
 #include <limits>
+#ifndef __cpp_lib_to_chars
 #include <locale>
 #include <sstream>
+#endif
 
 namespace vesk {
 
