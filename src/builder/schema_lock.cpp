@@ -243,6 +243,7 @@ std::string SchemaLock::ModelFault(const ClassDef& def, const std::vector<Schema
 // A model that others hold is recorded with them until it has a $schema: its first release must be what they hold.
 std::string FirstReleaseFault(const ClassDef& def, const SchemaLine& first, const std::vector<std::string>& held) {
   std::vector<std::string> words;
+  words.reserve(held.size());
   for (const std::string& word : held) words.push_back("+" + word);
   if (first.words == words) return {};
   return "The first release of " + PrintedElement(def) + " is \"" + Joined(first.words) +

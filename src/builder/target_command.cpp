@@ -130,7 +130,7 @@ std::string LinkTool(const Project& project, const std::string& target) {
   const bool isStatic = project.targetType == TargetType::StaticLibrary;
   const Compiler& compiler = CompilerOf(project.settings->compiler);
   if (!isStatic) return std::string(compiler.link);
-  const std::string command(compiler.archive);
+  std::string command(compiler.archive);
   if (compiler.family != CompilerFamily::Gcc) return command;
   return command + " \"" + AsInput(project.settings->compiler, target) + "\"";
 }

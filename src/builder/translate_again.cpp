@@ -33,6 +33,7 @@ std::vector<ScannedFile*> BuildFiles::BeginPass(const std::vector<ScannedFile*>&
 
 void ProjectBuilder::BeginPass(const std::vector<ProjectFile*>& changed) {
   std::vector<ScannedFile*> stale;
+  stale.reserve(changed.size());
   for (ProjectFile* file : changed) stale.push_back(&GetScannedFile(*file));
   const auto write = [this](ScannedFile* file) { file->needsWriting = file->file.project == &project; };
   std::for_each(stale.begin(), stale.end(), write);

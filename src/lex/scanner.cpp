@@ -44,7 +44,7 @@ constexpr std::array<int8_t, 128> MakeOperatorIndex() {
   std::array<int8_t, 128> index{};
   for (int8_t& entry : index) entry = -1;
   for (size_t i = 0; i < std::size(kOperators); ++i) {
-    index[static_cast<size_t>(kOperators[i].first)] = static_cast<int8_t>(i);
+    index[static_cast<unsigned char>(kOperators[i].first)] = static_cast<int8_t>(i);
   }
   return index;
 }
@@ -55,7 +55,7 @@ bool NextIs(const LexScanner& scanner, char c) { return scanner.begin < scanner.
 int32_t ScanOperator(LexScanner& scanner) {
   const char* const begin = scanner.begin;
   const char first = *scanner.begin++;
-  const OperatorForms& forms = kOperators[static_cast<size_t>(kOperatorIndex[static_cast<size_t>(first)])];
+  const OperatorForms& forms = kOperators[static_cast<uint8_t>(kOperatorIndex[static_cast<unsigned char>(first)])];
   if (first == '-' && NextIs(scanner, '>')) {
     ++scanner.begin;
     return kArrow;

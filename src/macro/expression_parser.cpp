@@ -161,8 +161,6 @@ struct ExpressionGrammar {
     const LexToken token = parser.current;
     switch (token.kind) {
       case kDecimal:
-        parser.Advance();
-        return Literal::OfInt(static_cast<int64_t>(IntegerValue(token, parser.scanner.dialect)));
       case kHex:
         parser.Advance();
         return Literal::OfInt(static_cast<int64_t>(IntegerValue(token, parser.scanner.dialect)));

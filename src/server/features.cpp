@@ -49,7 +49,7 @@ void Server::AskAt(const std::string& method, const Json& params, const Place& p
   if (m_clangd->IsRunning()) m_askedOfClangd[request] = id;
 }
 
-void Server::Hover(const Json& params, Reply reply) {
+void Server::Hover(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place) return reply(nullptr);
   const bool isProject = IsProjectText(*place->document);
@@ -65,7 +65,7 @@ void Server::Hover(const Json& params, Reply reply) {
 
 // --- Completion
 
-void Server::Completion(const Json& params, Reply reply) {
+void Server::Completion(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place) return reply(nullptr);
   if (IsProjectText(*place->document)) {
@@ -93,7 +93,7 @@ void Server::Completion(const Json& params, Reply reply) {
   });
 }
 
-void Server::ResolveCompletion(const Json& params, Reply reply) {
+void Server::ResolveCompletion(const Json& params, const Reply& reply) {
   if (!m_clangd || !params.contains("data")) return reply(params);
   m_clangd->Ask("completionItem/resolve", params, [params, reply](const Json& answer) {
     Json item = params;
@@ -104,7 +104,7 @@ void Server::ResolveCompletion(const Json& params, Reply reply) {
   });
 }
 
-void Server::SignatureHelp(const Json& params, Reply reply) {
+void Server::SignatureHelp(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place || !place->file) return reply(nullptr);
   AskAt("textDocument/signatureHelp", params, *place, reply);
@@ -112,7 +112,7 @@ void Server::SignatureHelp(const Json& params, Reply reply) {
 
 // --- Places
 
-void Server::Definition(const Json& params, Reply reply) {
+void Server::Definition(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place || !place->file) return reply(nullptr);
   Json own = m_own->Definition(*place->file, place->offset);
@@ -121,13 +121,13 @@ void Server::Definition(const Json& params, Reply reply) {
         [this, reply](const Json& answer) { reply(m_mapping->Locations(answer)); });
 }
 
-void Server::OtherLocations(const std::string& method, const Json& params, Reply reply) {
+void Server::OtherLocations(const std::string& method, const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place || !place->file) return reply(nullptr);
   AskAt(method, params, *place, [this, reply](const Json& answer) { reply(m_mapping->Locations(answer)); });
 }
 
-void Server::Highlights(const Json& params, Reply reply) {
+void Server::Highlights(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place || !place->file) return reply(nullptr);
   AskAt("textDocument/documentHighlight", params, *place, [this, file = place->file, reply](const Json& answer) {
@@ -142,7 +142,7 @@ void Server::Highlights(const Json& params, Reply reply) {
 
 // --- Symbols: those of `$` declarations, and of C++ what stands in the source as it is.
 
-void Server::DocumentSymbols(const Json& params, Reply reply) {
+void Server::DocumentSymbols(const Json& params, const Reply& reply) {
   Document* const document = FindDocument(params);
   if (!document || !document->file) return reply(nullptr);
   ProjectFile* const file = document->file;
@@ -171,7 +171,7 @@ void Server::DocumentSymbols(const Json& params, Reply reply) {
   });
 }
 
-void Server::WorkspaceSymbols(const Json& params, Reply reply) {
+void Server::WorkspaceSymbols(const Json& params, const Reply& reply) {
   if (!m_own || !m_world->IsLoaded()) return reply(nullptr);
   Json symbols = m_own->WorkspaceSymbols(TextAt(params, "query"));
   if (!m_clangd) return reply(std::move(symbols));
@@ -191,7 +191,7 @@ void Server::WorkspaceSymbols(const Json& params, Reply reply) {
 
 // --- Changes
 
-void Server::PrepareRename(const Json& params, Reply reply) {
+void Server::PrepareRename(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place || !place->file) return reply(nullptr);
   AskAt("textDocument/prepareRename", params, *place, [this, file = place->file, reply](const Json& answer) {
@@ -204,7 +204,7 @@ void Server::PrepareRename(const Json& params, Reply reply) {
   });
 }
 
-void Server::Rename(const Json& params, Reply reply) {
+void Server::Rename(const Json& params, const Reply& reply) {
   const auto place = PlaceOf(params);
   if (!place || !place->file) return reply(nullptr);
   AskAt("textDocument/rename", params, *place, [this, reply](const Json& answer) {
@@ -215,7 +215,7 @@ void Server::Rename(const Json& params, Reply reply) {
   });
 }
 
-void Server::InlayHints(const Json& params, Reply reply) {
+void Server::InlayHints(const Json& params, const Reply& reply) {
   Document* const document = FindDocument(params);
   if (!document || !document->file || !m_clangd) return reply(nullptr);
   ProjectFile* const file = document->file;
@@ -246,7 +246,7 @@ void Server::InlayHints(const Json& params, Reply reply) {
 }
 
 // What a message names as its cure, and what clangd offers for text that was copied.
-void Server::CodeActions(const Json& params, Reply reply) {
+void Server::CodeActions(const Json& params, const Reply& reply) {
   Document* const document = FindDocument(params);
   if (!document || !m_world) return reply(nullptr);
   Json actions = QuickFixes(*m_world, *m_mapping, m_texts)
@@ -272,18 +272,18 @@ void Server::CodeActions(const Json& params, Reply reply) {
 
 // --- Of the text alone
 
-void Server::SemanticTokensFull(const Json& params, Reply reply) {
+void Server::SemanticTokensFull(const Json& params, const Reply& reply) {
   const Document* const document = FindDocument(params);
   if (!document) return reply(nullptr);
   reply({{"data", SemanticTokens(document->text, m_columns)}});
 }
 
-void Server::Folding(const Json& params, Reply reply) {
+void Server::Folding(const Json& params, const Reply& reply) {
   const Document* const document = FindDocument(params);
   reply(document ? FoldingRanges(document->text) : Json(nullptr));
 }
 
-void Server::ExecuteCommand(const Json& params, Reply reply) {
+void Server::ExecuteCommand(const Json& params, const Reply& reply) {
   const std::string command = TextAt(params, "command");
   const Json& arguments = At(params, "arguments");
   const std::string uri =

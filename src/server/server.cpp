@@ -183,7 +183,7 @@ void Server::Initialize(const Json& id, const Json& params) {
   if (!m_configuration.empty() && m_configuration.front() != '/')
     m_configuration = m_rootFolder + "/" + m_configuration;
   for (const Json& line : At(options, "arguments")) {
-    if (line.is_string()) m_lines.push_back(line.get<std::string>());
+    if (line.is_string()) m_lines.emplace_back(line.get<std::string>());
   }
   const Json& clangd = At(options, "clangd");
   m_clangdWords = {clangd.is_string() ? clangd.get<std::string>() : "clangd-19"};

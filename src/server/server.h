@@ -55,7 +55,7 @@ class Server {
   };
   // Answers later, or at once; null for none.
   using Reply = std::function<void(Json result)>;
-  using Handler = void (Server::*)(const Json& params, Reply reply);
+  using Handler = void (Server::*)(const Json& params, const Reply& reply);
   struct Feature {
     std::string_view method;
     Handler handle;
@@ -107,26 +107,32 @@ class Server {
   std::optional<Place> PlaceOf(const Json& params);
   // Asks clangd about the place, with the other parameters of the request. Null where it has no generated one.
   void AskAt(const std::string& method, const Json& params, const Place& place, Clangd::Answer answer);
-  void Hover(const Json& params, Reply reply);
-  void Completion(const Json& params, Reply reply);
-  void ResolveCompletion(const Json& params, Reply reply);
-  void SignatureHelp(const Json& params, Reply reply);
-  void Definition(const Json& params, Reply reply);
-  void OtherLocations(const std::string& method, const Json& params, Reply reply);
-  void Declaration(const Json& params, Reply reply) { OtherLocations("textDocument/declaration", params, reply); }
-  void TypeDefinition(const Json& params, Reply reply) { OtherLocations("textDocument/typeDefinition", params, reply); }
-  void Implementation(const Json& params, Reply reply) { OtherLocations("textDocument/implementation", params, reply); }
-  void References(const Json& params, Reply reply) { OtherLocations("textDocument/references", params, reply); }
-  void Highlights(const Json& params, Reply reply);
-  void DocumentSymbols(const Json& params, Reply reply);
-  void WorkspaceSymbols(const Json& params, Reply reply);
-  void PrepareRename(const Json& params, Reply reply);
-  void Rename(const Json& params, Reply reply);
-  void InlayHints(const Json& params, Reply reply);
-  void CodeActions(const Json& params, Reply reply);
-  void SemanticTokensFull(const Json& params, Reply reply);
-  void Folding(const Json& params, Reply reply);
-  void ExecuteCommand(const Json& params, Reply reply);
+  void Hover(const Json& params, const Reply& reply);
+  void Completion(const Json& params, const Reply& reply);
+  void ResolveCompletion(const Json& params, const Reply& reply);
+  void SignatureHelp(const Json& params, const Reply& reply);
+  void Definition(const Json& params, const Reply& reply);
+  void OtherLocations(const std::string& method, const Json& params, const Reply& reply);
+  void Declaration(const Json& params, const Reply& reply) {
+    OtherLocations("textDocument/declaration", params, reply);
+  }
+  void TypeDefinition(const Json& params, const Reply& reply) {
+    OtherLocations("textDocument/typeDefinition", params, reply);
+  }
+  void Implementation(const Json& params, const Reply& reply) {
+    OtherLocations("textDocument/implementation", params, reply);
+  }
+  void References(const Json& params, const Reply& reply) { OtherLocations("textDocument/references", params, reply); }
+  void Highlights(const Json& params, const Reply& reply);
+  void DocumentSymbols(const Json& params, const Reply& reply);
+  void WorkspaceSymbols(const Json& params, const Reply& reply);
+  void PrepareRename(const Json& params, const Reply& reply);
+  void Rename(const Json& params, const Reply& reply);
+  void InlayHints(const Json& params, const Reply& reply);
+  void CodeActions(const Json& params, const Reply& reply);
+  void SemanticTokensFull(const Json& params, const Reply& reply);
+  void Folding(const Json& params, const Reply& reply);
+  void ExecuteCommand(const Json& params, const Reply& reply);
 
   const std::string m_program;
   Mailbox m_mailbox;

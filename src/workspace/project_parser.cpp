@@ -256,7 +256,7 @@ std::string ProjectParser::ReadGeneralKey() {
   if (current.kind != kIdentifier) {
     throw LexScannerException("Expected identifier when read " + Printed(current), current);
   }
-  const std::string key = current.text.Text();
+  std::string key = current.text.Text();
   const bool isToolset = key == kToolsetKey;
   if (isToolset ? m_project.settings->platformToolset.empty()
                 : std::find(std::begin(kGeneralKeys), std::end(kGeneralKeys), key) == std::end(kGeneralKeys)) {

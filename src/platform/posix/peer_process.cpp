@@ -20,6 +20,7 @@ PeerProcess::PeerProcess(const std::vector<std::string>& words) {
   posix_spawn_file_actions_adddup2(&actions, ends[1], STDOUT_FILENO);
   posix_spawn_file_actions_addopen(&actions, STDERR_FILENO, "/dev/null", O_WRONLY, 0);
   std::vector<char*> arguments;
+  arguments.reserve(words.size() + 1);
   for (const std::string& word : words) arguments.push_back(const_cast<char*>(word.c_str()));
   arguments.push_back(nullptr);
   pid_t id = 0;

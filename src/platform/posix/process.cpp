@@ -154,8 +154,8 @@ class Running {
 }  // namespace
 
 bool FitsCommandLine(const std::vector<std::string>& words) {
-  constexpr size_t kLongestWord = 32 * 4096 - 1;  // of Linux: MAX_ARG_STRLEN
-  constexpr size_t kRoom = 64 * 1024;
+  constexpr size_t kLongestWord = size_t{32} * 4096 - 1;  // of Linux: MAX_ARG_STRLEN
+  constexpr size_t kRoom = size_t{64} * 1024;
   const long limit = sysconf(_SC_ARG_MAX);
   size_t size = kRoom;
   const auto add = [&](size_t length) { size += length + 1 + sizeof(char*); };

@@ -176,7 +176,7 @@ void CachedFunction::WriteCalculation() {
 std::string CachedFunction::KeyTypeFrom(size_t first) const {
   TypeView type = TypeView(m_signature.arguments[first].type).WithoutMetadata();
   while (type.Op() == kOpReference || type.Op() == kOpConst) type = type.Inner().WithoutMetadata();
-  const std::string text = TypeText(type);
+  std::string text = TypeText(type);
   if (first + 1 == m_signature.arguments.size()) return text;
   return "std::pair<" + text + "," + KeyTypeFrom(first + 1) + ">";
 }

@@ -22,6 +22,7 @@ std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const Scann
     Level& level = path.back();
     if (level.file == &to) {
       std::vector<const ScannedFile*> chain;
+      chain.reserve(path.size());
       for (const Level& step : path) chain.push_back(step.file);
       return chain;
     }
@@ -38,7 +39,7 @@ std::vector<const ScannedFile*> ImportChain(const ScannedFile& from, const Scann
 constexpr int kMaxImportDepth = 50'000;
 
 struct Nested {
-  explicit Nested(int& depth) : depth(depth) { ++depth; }
+  explicit Nested(int& counter) : depth(counter) { ++depth; }
   ~Nested() { --depth; }
   int& depth;
 };

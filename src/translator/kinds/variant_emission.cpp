@@ -236,7 +236,8 @@ void WriteData(TextWriter& out, const VariantDef& def) {
 
 void WriteVariantBody(TextWriter& out, const VariantDef& def) {
   const bool inClass = IsInClass(def);
-  auto declared = [&](std::string text) { return inClass ? std::string() : text; };  // is defined behind the class
+  // What is defined behind the class.
+  auto declared = [&](const std::string& text) { return inClass ? std::string() : text; };
   const bool makesFirst = MakesValueFirst(def);
   const std::string moving =
       makesFirst ? def.name + "(" + def.name + "&& _rhs) noexcept(" + NoexceptText(def) + ");\n" : "";

@@ -186,7 +186,7 @@ void VariantStatement::CheckTextOfItems() const {
   if (!m_parser.WantsCompilableText() || !m_def->HasSerialise()) return;
   for (const auto& item : m_def->m_items) {
     std::vector<TypeView> types{item->type};
-    for (const ClassField& field : item->fields) types.push_back(field.type);
+    for (const ClassField& field : item->fields) types.emplace_back(field.type);
     for (const TypeView type : types) {
       const NameSpaceElement* variant = VariantWithoutDefault(type, *m_def->owner.rootNameSpace);
       if (!variant) continue;

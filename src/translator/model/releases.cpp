@@ -15,8 +15,10 @@ std::vector<ModelRelease> ReleasesOf(const ClassDef& def) {
     if (field->IsDropped()) at(field->m_rsnDropped).drops.push_back(field);
   }
   std::vector<ModelRelease> ordered;
+  ordered.reserve(releases.size());
   for (auto& [number, release] : releases) ordered.push_back(std::move(release));
   return ordered;
+  ordered.reserve(releases.size());
 }
 
 }  // namespace qrex

@@ -139,11 +139,11 @@ class QrexParser : public ExpressionParser {
   FunctionSignature ParseFunctionSignature(const SignatureRules& rules);
   ParsedMember ParseMethodOrAttribute(const SignatureRules& rules);
   FunctionArg ParseFunctionArg(const SignatureRules& rules);
-  std::string ReadArgumentText();            // behind the current token, to the top-level `,` or `)` that ends it
-  void ParseMetadataList(std::string& out);  // `[` is current; behind `]` afterwards
-  void ParseMetadataValue(std::string& out);
+  std::string ReadArgumentText();                 // behind the current token, to the top-level `,` or `)` that ends it
+  void ParseMetadataList(std::string& metadata);  // `[` is current; behind `]` afterwards
+  void ParseMetadataValue(std::string& metadata);
   // The same, where the type or signature may be copied: text that compiles leaves `: [...]` out.
-  void ParseMetadataBehindColon(std::string& out);
+  void ParseMetadataBehindColon(std::string& metadata);
 
   // --- Warnings
   bool WarningOn(Warning warning) const { return warnings.On(warning); }
@@ -203,7 +203,8 @@ class QrexParser : public ExpressionParser {
   TypeCode ParseArraySuffix();
   std::vector<FunctionArg> ParseArguments(const SignatureRules& rules);
   void ParseSignatureEnd(FunctionSignature& signature, const SignatureRules& rules);
-  size_t ParseMetadataValues(std::string& out, int32_t close, std::string_view expected, std::string_view exceeded);
+  size_t ParseMetadataValues(std::string& metadata, int32_t close, std::string_view expected,
+                             std::string_view exceeded);
 
   const KeywordTables& m_keywords;
   const char* m_copyPosition;

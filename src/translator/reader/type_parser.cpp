@@ -345,13 +345,13 @@ ParsedMember QrexParser::ParseMethodOrAttribute(const SignatureRules& rules) {
 // --- Metadata
 
 // Values separated by `,` up to `close`, which is passed; their number.
-size_t QrexParser::ParseMetadataValues(std::string& out, int32_t close, std::string_view expected,
+size_t QrexParser::ParseMetadataValues(std::string& metadata, int32_t close, std::string_view expected,
                                        std::string_view exceeded) {
   NestingGuard guard(*this);
   size_t count = 0;
   for (; !Is(close); ++count) {
     if (count == kMaxMetadataValues) Fail(std::string(exceeded));
-    ParseMetadataValue(out);
+    ParseMetadataValue(metadata);
     if (Is(close)) continue;
     if (!Accept(kComma)) Fail(std::string(expected) + Printed(current));
   }
@@ -359,22 +359,22 @@ size_t QrexParser::ParseMetadataValues(std::string& out, int32_t close, std::str
   return count;
 }
 
-void QrexParser::ParseMetadataList(std::string& out) {
+void QrexParser::ParseMetadataList(std::string& metadata) {
   Expect(kOpenBracket, "[");
   std::string values;
   const size_t count = ParseMetadataValues(values, kCloseBracket, ", or ] expected in meta-data list when read ",
                                            "Maximum list size exceeded");
-  AppendMetadataList(out, count, values);
+  AppendMetadataList(metadata, count, values);
 }
 
-void QrexParser::ParseMetadataBehindColon(std::string& out) {
+void QrexParser::ParseMetadataBehindColon(std::string& metadata) {
   const char* const colon = previous.text.begin;
-  ParseMetadataList(out);
-  if (WantsCompilableText()) m_uncopied.push_back(TextRange(colon, previous.text.end));
+  ParseMetadataList(metadata);
+  if (WantsCompilableText()) m_uncopied.emplace_back(colon, previous.text.end);
 }
 
-void QrexParser::ParseMetadataValue(std::string& out) {
-  if (Is(kOpenBracket)) return ParseMetadataList(out);
+void QrexParser::ParseMetadataValue(std::string& metadata) {
+  if (Is(kOpenBracket)) return ParseMetadataList(metadata);
   if (Is(kIdentifier) && !Is("true") && !Is("false")) {
     const std::string name = ReadIdentifier();
     std::string values;
@@ -383,25 +383,25 @@ void QrexParser::ParseMetadataValue(std::string& out) {
       count = ParseMetadataValues(values, kCloseParen, ", or ) expected in functor arglist when read ",
                                   "Maximum functor arglist size exceeded");
     }
-    return AppendMetadataFunctor(out, name, count, values);
+    return AppendMetadataFunctor(metadata, name, count, values);
   }
   Literal value;
   ParseExpression(value);
   switch (value.kind) {
     case LiteralKind::Bool:
-      AppendMetadataBool(out, value.boolean);
+      AppendMetadataBool(metadata, value.boolean);
       break;
     case LiteralKind::Int64:
       if (value.integer < std::numeric_limits<int32_t>::min() || value.integer > std::numeric_limits<int32_t>::max()) {
         Fail("64-bit integer metadata not supported");
       }
-      AppendMetadataInt(out, static_cast<int32_t>(value.integer));
+      AppendMetadataInt(metadata, static_cast<int32_t>(value.integer));
       break;
     case LiteralKind::Float64:
-      AppendMetadataFloat(out, value.real);
+      AppendMetadataFloat(metadata, value.real);
       break;
     case LiteralKind::String:
-      AppendMetadataString(out, value.text);
+      AppendMetadataString(metadata, value.text);
       break;
     default:
       Fail("unsupported literal: " + Printed(current));

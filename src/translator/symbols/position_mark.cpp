@@ -15,7 +15,8 @@ std::string PositionMark(const char* source) {
 const char* MarkedPosition(std::string_view digits) {
   uintptr_t address = 0;
   const auto read = std::from_chars(digits.data(), digits.data() + digits.size(), address, 16);
-  return read.ptr == digits.data() + digits.size() ? reinterpret_cast<const char*>(address) : nullptr;
+  const bool isMark = read.ptr == digits.data() + digits.size();
+  return isMark ? reinterpret_cast<const char*>(address) : nullptr;  // NOLINT(performance-no-int-to-ptr): was a pointer
 }
 
 }  // namespace qrex

@@ -95,25 +95,25 @@ ProjectFile* ScannedFile::ResolveImport(const std::string& path) const {
 
 std::string ScannedFile::ImportHint(const std::string& path) const {
   if (ResolveImport(path)) return {};  // it failed for another reason
-  std::string text = "no project lists ";
+  std::string hint = "no project lists ";
   const auto candidates = ImportCandidates(file, path);
   for (auto candidate = candidates.begin(); candidate != candidates.end(); ++candidate) {
     if (std::find(candidates.begin(), candidate, *candidate) != candidate) continue;
-    text += (candidate == candidates.begin() ? "" : " or ") + *candidate;
+    hint += (candidate == candidates.begin() ? "" : " or ") + *candidate;
   }
-  return text;
+  return hint;
 }
 
 std::string ScannedFile::UseHint(const ScannedFile& imported) const {
   const Project& user = *file.project;
   const Project& used = *imported.file.project;
-  std::string text = file.path + " imports it";
-  if (!used.usesQrex) text += "; write qrex in " + used.filePath + ", or #include it";
+  std::string hint = file.path + " imports it";
+  if (!used.usesQrex) hint += "; write qrex in " + used.filePath + ", or #include it";
   const auto isUsed = [&](const std::string& path) { return user.workspace->FindSubproject(path) == &used; };
   if (&user != &used && std::none_of(user.subprojects.begin(), user.subprojects.end(), isUsed)) {
-    text += "; write \"" + used.rootToProjDir + "\" in subproj { } of " + user.filePath + ", and it is built first";
+    hint += "; write \"" + used.rootToProjDir + "\" in subproj { } of " + user.filePath + ", and it is built first";
   }
-  return text;
+  return hint;
 }
 
 bool ScannedFile::HasLineDirectives() const {
@@ -142,10 +142,10 @@ bool ScannedFile::MapGeneratedLine(int64_t generatedLine, TextWriter& trace, std
     trace << "\nINTERNAL ERROR: convert error position failed because line number invalid\n";
     return false;
   }
-  SourcePlace place;
-  if (!host.FindSourcePlace(position, place)) return false;
-  path = std::move(place.file);
-  line = place.line;
+  SourcePlace found;
+  if (!host.FindSourcePlace(position, found)) return false;
+  path = std::move(found.file);
+  line = found.line;
   return true;
 }
 
