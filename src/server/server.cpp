@@ -187,7 +187,7 @@ void Server::Initialize(const Json& id, const Json& params) {
   }
   const Json& clangd = At(options, "clangd");
   m_clangdWords = {clangd.is_string() ? clangd.get<std::string>() : "clangd-19"};
-  if (clangd.is_null()) m_clangdWords.push_back("clangd");  // tried where there is none of the first name
+  if (clangd.is_null()) m_clangdWords.emplace_back("clangd");  // tried where there is none of the first name
   Send({{"jsonrpc", "2.0"},
         {"id", id},
         {"result",
