@@ -18,7 +18,6 @@ std::vector<ModelRelease> ReleasesOf(const ClassDef& def) {
   ordered.reserve(releases.size());
   for (auto& [number, release] : releases) ordered.push_back(std::move(release));
   return ordered;
-  ordered.reserve(releases.size());
 }
 
 }  // namespace qrex
