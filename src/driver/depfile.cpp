@@ -1,6 +1,7 @@
 #include "driver/depfile.h"
 
 #include "builder/run_files.h"
+#include "platform/file_names.h"
 #include "platform/file_system.h"
 #include "text/exceptions.h"
 #include "text/files.h"
@@ -10,9 +11,11 @@
 
 namespace qrex {
 
-// Backslashes in front of what is escaped are doubled; elsewhere they stand for themselves.
+// Backslashes in front of what is escaped are doubled; elsewhere they stand for themselves. A drive stays as it is:
+// CMake would read a backslash there as a folder.
 std::string DepfileName(std::string_view path) {
-  std::string name;
+  std::string name(platform::kHasDrives ? DriveOf(path) : "");
+  path.remove_prefix(name.size());
   size_t backslashes = 0;
   for (const char c : path) {
     if (c == ' ' || c == '\t') name.append(backslashes + 1, '\\');

@@ -13,7 +13,7 @@ import tempfile
 import time
 from pathlib import Path
 
-from workspace_fixture import ROOT, equal, holds, install, lacks, need, run_tests
+from workspace_fixture import DRIVE, ROOT, equal, holds, install, lacks, need, run_tests
 
 INSTALLED = ["bin/Qrex", "share/qrex/templates/workspace/NAME.qrex", "share/qrex/editors/vim/ftdetect/qrex.vim", "share/doc/qrex/docs/tutorial.md", "share/man/man1/Qrex.1",
              "share/bash-completion/completions/Qrex", "share/zsh/vendor-completions/_Qrex",
@@ -39,15 +39,21 @@ def installed(test):
 @installed
 def test_components(prefix, work):
     equal([name for name in INSTALLED + RUNTIME if not (prefix / name).is_file()], [])
-    logs = [path.read_text() for path in Path(sys.argv[1]).resolve().parent.glob("built/*/log")]
+    logs = [path.read_text() for path in Path(sys.argv[1]).absolute().parent.glob("built/*/log")]
     equal((len(logs), [log for log in logs if "warning" in log]), (2, []))
 
 
 PAGE = ROOT / "docs/install.md"
 
 
+def alone(prefix):
+    """An environment in which the installed tool is found, and little more."""
+    bridges = {name: os.environ[name] for name in os.environ if DRIVE and name.startswith(("QREX_", "WINE"))}
+    return {"PATH": f"{prefix}/bin:/usr/bin:/bin", **bridges}
+
+
 def qrex(prefix, folder, *arguments, status=0):
-    done = subprocess.run(["Qrex", *arguments], cwd=folder, env={"PATH": f"{prefix}/bin:/usr/bin:/bin"}, stdin=subprocess.DEVNULL,
+    done = subprocess.run(["Qrex", *arguments], cwd=folder, env=alone(prefix), stdin=subprocess.DEVNULL,
                           capture_output=True, text=True)
     equal((done.returncode, done.stderr), (status, ""))
     return done.stdout
@@ -57,7 +63,7 @@ def qrex(prefix, folder, *arguments, status=0):
 def test_first_workspace(prefix, work):
     """The steps of the page. The runtime comes built, for clang++ and make as well."""
     steps = re.search(r"\n\n((?:    .*\n)*    Qrex --init zoo\n(?:    .*\n)*)", PAGE.read_text()).group(1)
-    environment = {"PATH": f"{prefix}/bin:/usr/bin:/bin"}
+    environment = alone(prefix)
     output = subprocess.run(["bash", "-ec", steps], cwd=work, env=environment, check=True, capture_output=True, text=True).stdout
     holds(output, "[prepackaged - only processing headers]", "Completed....", "Leo had 4.5 kg, as release 1 tells\n")
     workspace, program = work / "zoo", work / "zoo/out/lib/x64/Debug/zoo_app"

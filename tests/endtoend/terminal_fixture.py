@@ -35,4 +35,7 @@ def on_terminal(command, folder, columns=80, until=None, kill=None, **environmen
             until = None
     os.close(terminal)
     text = output.decode().replace("\r\n", "\n")
-    return re.sub(r"\x1b\[(\?25[lh]|K|m)", "", text) if DRIVE else text, process.wait(timeout=60)
+    if DRIVE:  # it goes over blanks
+        text = re.sub(r"\x1b\[(\d*)C", lambda moved: " " * int(moved[1] or 1), text)
+        text = re.sub(r"\x1b\[(\?25[lh]|K|m)|\r(?=\n)", "", text)
+    return text, process.wait(timeout=60)

@@ -71,6 +71,9 @@ void Take(const std::vector<std::string>& words) {
 }
 
 int PlayTool(const std::string& name, const std::vector<std::string>& words) {
+  HANDLE lock;  // of the log: what two append at once may be lost
+  while ((lock = CreateFileA("log.lock", GENERIC_WRITE, 0, nullptr, OPEN_ALWAYS, 0, nullptr)) == INVALID_HANDLE_VALUE)
+    Sleep(1);
   std::ofstream log("log", std::ios::app | std::ios::binary);
   log << name;
   for (const std::string& word : words) log << " " << word;
@@ -79,6 +82,7 @@ int PlayTool(const std::string& name, const std::vector<std::string>& words) {
     if (word.starts_with('@')) log << TextOf(word.substr(1)) << "\n";
   }
   log.close();
+  CloseHandle(lock);
   std::cout << TextOf("say") << std::flush;
   const std::string script = TextOf(OwnPath() + ".script");
   if (script.starts_with("sleep ")) Sleep(static_cast<DWORD>(std::stoul(script.substr(6))));

@@ -5,6 +5,7 @@
 namespace qrex::platform {
 
 const bool kNamesFoldCase = true;
+const bool kHasDrives = true;
 
 // As file systems do it, in upper case, whatever language the user has.
 std::string FoldCase(std::string_view path) {

@@ -123,7 +123,7 @@ TEST_F(WindowsFileTest, JobServerOfMake) {
   SetEnvironment("MAKEFLAGS", "");
 }
 
-TEST_F(WindowsFileTest, SentencesAreTheSystems) {
+TEST(ErrorTest, Sentences) {
   wchar_t text[512];
   const DWORD length = FormatMessageW(FORMAT_MESSAGE_FROM_SYSTEM, nullptr, 5, 0, text, 512, nullptr);
   std::string expected = Narrow({text, length});
