@@ -1,5 +1,6 @@
 // What the editor has open: its texts, what comes of them, and what is told of it.
 #include <algorithm>
+#include <utility>
 
 #include "driver/compile_commands.h"
 #include "platform/file_system.h"
@@ -44,9 +45,12 @@ int SeverityOf(const Message& message) {
 }
 
 std::string CacheFolder(const std::string& configuration) {
-  const auto cache = platform::EnvironmentValue("XDG_CACHE_HOME");
-  const auto home = platform::EnvironmentValue("HOME");
-  const std::string base = cache && !cache->empty() ? *cache : home.value_or("/tmp") + "/.cache";
+  std::string base;
+  for (const auto& [name, folder] : {std::pair("XDG_CACHE_HOME", ""), {"LOCALAPPDATA", ""}, {"HOME", "/.cache"}}) {
+    const auto value = platform::EnvironmentValue(name);
+    if (base.empty() && value && !value->empty()) base = NormalisePath(*value) + folder;
+  }
+  if (base.empty()) base = "/tmp/.cache";
   return base + "/qrex-lsp/" + std::to_string(Crc32(configuration));
 }
 
@@ -138,7 +142,7 @@ void Server::StartClangd() {
   if (m_clangdWords.front().empty()) return;
   std::string program;
   for (const std::string& name : m_clangdWords) {
-    if (program.empty() && (name.find('/') != std::string::npos || !platform::FindProgram(name).empty()))
+    if (program.empty() && (name.find_first_of("/\\") != std::string::npos || !platform::FindProgram(name).empty()))
       program = name;
   }
   if (program.empty()) return Log(kWarning, "clangd is not installed: C++ itself is not known", true);

@@ -25,7 +25,8 @@ int main(int argc, char** argv) {
   int status = 1;
   qrex::platform::FillStandardHandles();
   qrex::platform::SetSignals();
-  auto& server = *new qrex::server::Server(argv[0]);  // left to the end of the process
+  const auto words = qrex::platform::CommandLineWords(argc, argv);
+  auto& server = *new qrex::server::Server(words.empty() ? "" : words.front());  // left to the end of the process
   qrex::platform::RunOnStack(kStackSize, [&] { status = server.Run(); });
   qrex::platform::EndAtOnce(status);
 }

@@ -2,7 +2,9 @@
 
 #include <algorithm>
 
+#include "platform/file_names.h"
 #include "text/files.h"
+#include "text/paths.h"
 
 namespace qrex::server {
 
@@ -105,12 +107,17 @@ std::string PathOfUri(std::string_view uri) {
     path += isEscape ? static_cast<char>(HexValue(uri[i + 1]) * 16 + HexValue(uri[i + 2])) : uri[i];
     if (isEscape) i += 2;
   }
+  if (platform::kHasDrives && path.size() > 2 && path[2] == ':') {  // of which editors write either letter
+    path.erase(0, 1);
+    if (path[0] >= 'a' && path[0] <= 'z') path[0] = static_cast<char>(path[0] - 'a' + 'A');
+  }
   return path;
 }
 
 std::string UriOfPath(std::string_view path) {
   static constexpr char kDigits[] = "0123456789ABCDEF";
   std::string uri(kScheme);
+  if (!DriveOf(path).empty()) uri += '/';
   for (const char c : path) {
     const bool isPlain =
         (IsWordByte(c) && (c & 0x80) == 0) || std::string_view("/-.~").find(c) != std::string_view::npos;

@@ -7,11 +7,17 @@ import threading
 from pathlib import Path
 from urllib.parse import quote, unquote
 
+from workspace_fixture import DRIVE
+
 TIMEOUT = 120
 
 
 def uri_of(path):
-    return "file://" + quote(str(path))
+    return f"file://{'/' if DRIVE else ''}{quote(DRIVE + str(path))}"
+
+
+def path_of(uri):
+    return unquote(uri).removeprefix("file://").removeprefix(f"/{DRIVE}" if DRIVE else "")
 
 
 class Client:
@@ -67,7 +73,7 @@ class Client:
         if "method" not in message:
             self.answers[message["id"]] = message
         elif message["method"] == "textDocument/publishDiagnostics":
-            self.diagnostics[unquote(message["params"]["uri"])[7:]] = message["params"]["diagnostics"]
+            self.diagnostics[path_of(message["params"]["uri"])] = message["params"]["diagnostics"]
         else:
             self.notes.append(message)
         return message
@@ -143,7 +149,7 @@ class Client:
         self.change(name, *self.offsets(self.texts[name], edit["range"]), edit["newText"])
 
     def name_of(self, uri):
-        return str(Path(unquote(uri)[7:]).relative_to(self.folder))
+        return str(Path(path_of(uri)).relative_to(self.folder))
 
     def offsets(self, text, place):
         lines = text.split("\n")

@@ -8,7 +8,7 @@ from pathlib import Path
 from random import Random
 
 from lsp_fixture import Client, server_beside, uri_of
-from workspace_fixture import RUNTIME, Skipped, Workspace, data, equal, holds, lacks, need, project, run_tests, workspace_of
+from workspace_fixture import DRIVE, RUNTIME, Skipped, Workspace, data, equal, holds, lacks, need, project, run_tests, workspace_of
 
 HEADER = data("server/shape.h")
 MAIN = data("server/app.cpp")
@@ -33,7 +33,7 @@ def session(*tools, **options):
             if not server_beside(binary):
                 raise Skipped("qrex-lsp")
             with Workspace(binary, FILES) as workspace:
-                os.environ["XDG_CACHE_HOME"] = str(workspace.path("cache"))
+                os.environ["XDG_CACHE_HOME"] = DRIVE + str(workspace.path("cache"))
                 def there():
                     return sorted(p for p in workspace.folder.rglob("*") if "cache" not in p.parts)
                 before = there()

@@ -205,7 +205,9 @@ def build_folder(folder, windows, linux):
     wrapper = Path(__file__).with_name("Qrex")
     folder.mkdir()
     (folder / "cmake_install.cmake").write_text(INSTALL.format(lock=folder / "lock", linux=linux, windows=windows, wrapper=wrapper))
-    for path in [wrapper, Path(windows) / "Qrex.exe", *(Path(linux) / name for name in ("built", "CPackConfig.cmake"))]:
+    (folder / "qrex-lsp").symlink_to(wrapper)
+    of_windows = [Path(windows) / name for name in ("Qrex.exe", "qrex-lsp.exe")]
+    for path in [wrapper, *of_windows, *(Path(linux) / name for name in ("built", "CPackConfig.cmake"))]:
         (folder / path.name).symlink_to(path)
     return folder / "Qrex"
 

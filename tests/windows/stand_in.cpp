@@ -57,6 +57,7 @@ void Take(const std::vector<std::string>& words) {
   }
   if (verb == "env") std::cout << (std::getenv(first.c_str()) ? std::getenv(first.c_str()) : "none") << std::flush;
   if (verb == "read") std::cout << std::string(std::istreambuf_iterator<char>(std::cin), {}) << "." << std::flush;
+  for (std::string line; verb == "answer" && std::getline(std::cin, line);) std::cout << line << "!" << std::flush;
   if (verb == "sleep") Sleep(static_cast<DWORD>(std::stoul(first)));
   if (verb == "touch") std::ofstream(first) << "";
   if (verb == "start") std::ofstream(first) << Start("sleep 30000", false);

@@ -31,26 +31,26 @@ PeerProcess::PeerProcess(const std::vector<std::string>& words) {
     close(ends[0]);
     return;
   }
-  m_id = id;
-  m_socket = ends[0];
+  m_process = id;
+  m_reads = m_writes = ends[0];
 }
 
 PeerProcess::~PeerProcess() {
-  if (m_id > 0) {
-    kill(m_id, SIGKILL);
-    while (waitpid(m_id, nullptr, 0) < 0 && errno == EINTR) {
+  if (const auto id = static_cast<pid_t>(m_process); id != 0) {
+    kill(id, SIGKILL);
+    while (waitpid(id, nullptr, 0) < 0 && errno == EINTR) {
     }
   }
-  if (m_socket >= 0) close(m_socket);
+  if (m_reads != kNone) close(static_cast<int>(m_reads));
 }
 
 void PeerProcess::CloseStreams() {
-  if (m_socket >= 0) shutdown(m_socket, SHUT_RDWR);
+  if (m_reads != kNone) shutdown(static_cast<int>(m_reads), SHUT_RDWR);
 }
 
 bool PeerProcess::Write(std::string_view bytes) {
   while (!bytes.empty()) {
-    const ssize_t sent = send(m_socket, bytes.data(), bytes.size(), MSG_NOSIGNAL);
+    const ssize_t sent = send(static_cast<int>(m_writes), bytes.data(), bytes.size(), MSG_NOSIGNAL);
     if (sent < 0 && errno == EINTR) continue;
     if (sent <= 0) return false;
     bytes.remove_prefix(static_cast<size_t>(sent));
@@ -64,7 +64,7 @@ bool PeerProcess::Read(std::string& bytes) {
   bytes.resize(size + kChunk);
   ssize_t count;
   do {
-    count = recv(m_socket, bytes.data() + size, kChunk, 0);
+    count = recv(static_cast<int>(m_reads), bytes.data() + size, kChunk, 0);
   } while (count < 0 && errno == EINTR);
   bytes.resize(size + static_cast<size_t>(count > 0 ? count : 0));
   return count > 0;

@@ -1,14 +1,12 @@
 #include "platform/process.h"
 
 #include <algorithm>
-#include <array>
 #include <atomic>
 #include <csignal>
 #include <cstdio>
 
 #include "platform/console.h"
-#include "platform/windows/api.h"
-#include "platform/windows/interpreter.h"
+#include "platform/windows/child.h"
 #include "platform/windows/tool_output.h"
 
 namespace qrex::platform {
@@ -19,16 +17,7 @@ using Cause = ProcessEnd::Cause;
 
 constexpr int kUnknownCommand = 9009;            // as the interpreter has it
 constexpr DWORD kEndedByInterrupt = 0xC000013A;  // the status of one that Ctrl-C has ended
-constexpr DWORD kEndedByUs = 0xC000010A;         // "the process is ending"
 constexpr DWORD kFirstException = 0xC0000000;    // that nobody handled
-
-constexpr int kMoreTries = 5;
-constexpr DWORD kPause = 50;  // milliseconds
-
-// What keeps a process from being made may be over in a moment: a scanner reads the program, or the system is short.
-bool MayPass(DWORD error) {
-  return error == ERROR_SHARING_VIOLATION || error == ERROR_NO_SYSTEM_RESOURCES || error == ERROR_INTERNAL_ERROR;
-}
 
 ProcessEnd Interrupted() { return {Cause::EndedBySignal, SIGINT, {}}; }
 
@@ -141,25 +130,6 @@ class InterruptWatch {
 
 enum EventKey : ULONG_PTR { kOutputKey, kEndKey };
 
-// A tool, with all that it starts, as one thing: it ends with this process, however that ends, unless it ended before.
-// Servers that are to stay leave it when they are started, if they ask for that as they should.
-class ToolJob {
- public:
-  ToolJob() : m_job(CreateJobObjectW(nullptr, nullptr)) { Limit(JOB_OBJECT_LIMIT_KILL_ON_JOB_CLOSE); }
-  HANDLE Get() const { return m_job.Get(); }
-  void Add(HANDLE process) { AssignProcessToJobObject(m_job.Get(), process); }
-  void End() { TerminateJobObject(m_job.Get(), kEndedByUs); }
-  void LeaveTheRest() { Limit(0); }
-
- private:
-  void Limit(DWORD flags) {
-    JOBOBJECT_EXTENDED_LIMIT_INFORMATION limits = {};
-    limits.BasicLimitInformation.LimitFlags = flags | JOB_OBJECT_LIMIT_BREAKAWAY_OK;
-    SetInformationJobObject(m_job.Get(), JobObjectExtendedLimitInformation, &limits, sizeof limits);
-  }
-  Handle m_job;
-};
-
 class Running {
  public:
   explicit Running(Processes::Id id) : output(ended.output), errors(ended.errors) { ended.id = id; }
@@ -191,38 +161,6 @@ class Running {
  private:
   HANDLE m_wait = nullptr;
 };
-
-// What a new process is given: of the handles of this one its three streams alone, and the job that it belongs to from
-// its very begin, where the system can do that (Windows 10).
-class Inheritance {
- public:
-  Inheritance(HANDLE input, HANDLE output, HANDLE errors, HANDLE job) : m_streams{input, output, errors}, m_job(job) {
-    constexpr DWORD_PTR kJobList = 0x2000D;  // PROC_THREAD_ATTRIBUTE_JOB_LIST
-    SIZE_T size = 0;
-    InitializeProcThreadAttributeList(nullptr, 2, 0, &size);
-    m_space.resize(size);
-    InitializeProcThreadAttributeList(List(), 2, 0, &size);
-    UpdateProcThreadAttribute(List(), 0, kJobList, &m_job, sizeof m_job, nullptr, nullptr);
-    std::sort(m_streams.begin(), m_streams.end());
-    const auto end = std::unique(m_streams.begin(), m_streams.end());
-    UpdateProcThreadAttribute(List(), 0, PROC_THREAD_ATTRIBUTE_HANDLE_LIST, m_streams.data(),
-                              static_cast<size_t>(end - m_streams.begin()) * sizeof(HANDLE), nullptr, nullptr);
-  }
-  ~Inheritance() { DeleteProcThreadAttributeList(List()); }
-  Inheritance(const Inheritance&) = delete;
-  Inheritance& operator=(const Inheritance&) = delete;
-  LPPROC_THREAD_ATTRIBUTE_LIST List() { return reinterpret_cast<LPPROC_THREAD_ATTRIBUTE_LIST>(m_space.data()); }
-
- private:
-  std::array<HANDLE, 3> m_streams;
-  HANDLE m_job;
-  std::vector<char> m_space;
-};
-
-Handle OpenNul(DWORD access) {
-  SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
-  return Handle(CreateFileW(L"NUL", access, kShareAll, &inherited, OPEN_EXISTING, 0, nullptr));
-}
 
 Handle Inheritable(DWORD standardHandle) {
   HANDLE copy = nullptr;
@@ -261,42 +199,16 @@ class Processes::Host {
 
 // Well: 0.
 DWORD Processes::Host::Create(const Program& program, const Call& call, Running& running) {
-  std::wstring text = Wide(call.text);
-  if (call.program.empty()) return ERROR_FILE_NOT_FOUND;
-  if (text.size() > (call.isInterpreted ? kLongestInterpreted : kLongestCall)) return ERROR_FILENAME_EXCED_RANGE;
   const bool takesOutput = program.output == Program::Stream::Captured;
   const bool takesErrors = program.errors == Program::Stream::Captured;
   const Handle input = OpenNul(GENERIC_READ);
   const Handle output = takesOutput ? running.output.Open(m_port.Get(), kOutputKey) : Inheritable(STD_OUTPUT_HANDLE);
   const Handle errors = takesErrors ? running.errors.Open(m_port.Get(), kOutputKey) : Inheritable(STD_ERROR_HANDLE);
   if (!input || !output || !errors) return GetLastError();
-  Inheritance inheritance(input.Get(), output.Get(), program.errorsIntoOutput ? output.Get() : errors.Get(),
-                          running.job.Get());
-  STARTUPINFOEXW start = {};
-  start.StartupInfo.cb = sizeof start;
-  start.StartupInfo.dwFlags = STARTF_USESTDHANDLES;
-  start.StartupInfo.hStdInput = input.Get();
-  start.StartupInfo.hStdOutput = output.Get();
-  start.StartupInfo.hStdError = program.errorsIntoOutput ? output.Get() : errors.Get();
-  start.lpAttributeList = inheritance.List();
-  constexpr DWORD kFlags = EXTENDED_STARTUPINFO_PRESENT | CREATE_UNICODE_ENVIRONMENT | CREATE_SUSPENDED;
-  PROCESS_INFORMATION made;
-  const std::wstring file = Wide(call.program);
-  const auto create = [&] {
-    return CreateProcessW(file.c_str(), text.data(), nullptr, nullptr, TRUE, kFlags, nullptr, nullptr,
-                          &start.StartupInfo, &made) != 0;
-  };
-  bool isMade = create();
-  for (int i = 0; i < kMoreTries && !isMade && MayPass(GetLastError()); ++i) {
-    Sleep(kPause);
-    isMade = create();
-  }
-  if (!isMade) return GetLastError();
-  if (!made.hProcess) return ERROR_BAD_EXE_FORMAT;  // something was started that is none of this system's processes
-  const Handle thread(made.hThread);
-  running.job.Add(made.hProcess);  // at the latest, ahead of its first step: all that it starts belongs there
-  running.Watch(Handle(made.hProcess), m_port.Get());
-  ResumeThread(made.hThread);
+  Handle process;
+  const HANDLE streams[] = {input.Get(), output.Get(), program.errorsIntoOutput ? output.Get() : errors.Get()};
+  if (const DWORD error = StartChild(call, streams, running.job, process); error != 0) return error;
+  running.Watch(std::move(process), m_port.Get());
   return 0;
 }
 

@@ -6,9 +6,11 @@
 #include <chrono>
 #include <csignal>
 #include <map>
+#include <thread>
 
 #include "platform/file_system.h"
 #include "platform/interpreter.h"
+#include "platform/peer_process.h"
 #include "platform/windows/api.h"
 #include "platform/windows/interpreter.h"
 #include "world_fixture.h"
@@ -101,6 +103,23 @@ TEST_F(ProcessTest, Words) {
   EXPECT_EQ(expected + "<%TEMP%><100%>", Output(Quiet(line + R"( %TEMP% "100%")")));
   EXPECT_EQ(expected, Output(Quiet(line + " 2>&1")));
   EXPECT_EQ(R"(show "a|b" 2>&1 1>x a^&b "100"^%"")", ForInterpreter(R"(show "a|b" 2>&1 1>x a&b "100%")"));
+}
+
+TEST_F(ProcessTest, Peers) {
+  EXPECT_FALSE(PeerProcess({"nowhere-to-be-found"}).IsStarted());
+  PeerProcess peer({QREX_STAND_IN, "answer"});
+  ASSERT_TRUE(peer.IsStarted() && peer.Write("one\n"));
+  std::string answers;
+  while (answers.size() < 4 && peer.Read(answers)) {
+  }
+  EXPECT_EQ("one!", answers);
+  std::thread waits([&] {
+    while (peer.Read(answers)) {
+    }
+  });
+  peer.CloseStreams();
+  waits.join();
+  EXPECT_EQ("one!", answers);
 }
 
 TEST_F(ProcessTest, OursStaysOurs) {
