@@ -48,10 +48,11 @@ def units(build):
 
 
 def program(build):
-    count = Count("the program")
-    told = run(["x86_64-w64-mingw32-objdump", "-p", str(build / "Qrex.exe")]).stdout.decode()
-    others = set(name.lower() for name in re.findall(r"DLL Name: (\S+)", told)) - SYSTEM_LIBRARIES
-    count.take("libraries", f"It needs {others}" if others else None)
+    count = Count("the programs")
+    for name in ("Qrex.exe", "qrex-lsp.exe"):
+        told = run(["x86_64-w64-mingw32-objdump", "-p", str(build / name)]).stdout.decode()
+        others = set(library.lower() for library in re.findall(r"DLL Name: (\S+)", told)) - SYSTEM_LIBRARIES
+        count.take(f"libraries of {name}", f"It needs {others}" if others else None)
     return count
 
 
