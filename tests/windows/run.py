@@ -221,9 +221,12 @@ def main():
             begin = time.monotonic()
             counts.append(group())
             counts[-1].end(time.monotonic() - begin)
+    met = {name for count in counts for label in count.skipped for name in (label, label.partition(".")[0])}
+    gone = [label for label in KNOWN if label not in met and (folder or "/" not in label)]
+    print("".join(f"FAILED skipped.txt: there is no {label}\n" for label in gone), end="")
     total = [sum(part) for part in zip(*((c.passed, len(c.failed), len(c.skipped)) for c in counts))]
     print(f"{total[0]} passed, {total[1]} failed, {total[2]} skipped: {100 * sum(total[:2]) // sum(total)} % were run")
-    sys.exit(1 if total[1] else 0)
+    sys.exit(1 if total[1] or gone else 0)
 
 
 if __name__ == "__main__":
