@@ -18,6 +18,7 @@ from bridges import Bridges
 from common import ROOT, WINE, WRAPPER, Count, run, text_of
 
 SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll", "rpcrt4.dll", "shell32.dll"}
+LONG = 20  # seconds, beyond which it is told what a test took
 # What cannot pass under Wine, with the reason: single tests, whole scripts, cases.
 KNOWN = dict(line.split(None, 1) for line in (ROOT / "tests/windows/skipped.txt").read_text().splitlines()
              if line and not line.startswith("#"))
@@ -174,7 +175,13 @@ def at_twos(count, play, labels):
     """Two at once; what cannot pass is not tried, what lacks something here says so."""
     def play_unless_known(label):
         reason = KNOWN.get(label) or KNOWN.get(label.partition(".")[0])
-        return (label, reason, None) if reason else (label, *play(label))
+        if reason:
+            return label, reason, None
+        begin = time.monotonic()
+        told = play(label)
+        if time.monotonic() - begin > LONG:
+            print(f"{label} took {time.monotonic() - begin:.0f} s", flush=True)
+        return label, *told
     with ThreadPoolExecutor(2) as pool:
         for label, reason, failure in pool.map(play_unless_known, labels):
             if reason:
