@@ -17,7 +17,7 @@ import compiled
 from bridges import Bridges
 from common import ROOT, WINE, WRAPPER, Count, run, text_of
 
-SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll", "rpcrt4.dll", "shell32.dll"}
+SYSTEM_LIBRARIES = {"kernel32.dll", "msvcrt.dll"}
 LONG = 20  # seconds, beyond which it is told what a test took
 # What cannot pass under Wine, with the reason: single tests, whole scripts, cases.
 KNOWN = dict(line.split(None, 1) for line in (ROOT / "tests/windows/skipped.txt").read_text().splitlines()

@@ -1,14 +1,19 @@
 #include "platform/system.h"
 
 #include <rpc.h>
-#include <shellapi.h>
 
 #include <algorithm>
 #include <exception>
 #include <iterator>
 
+#include "platform/dynamic_library.h"
 #include "platform/file_system.h"
 #include "platform/windows/api.h"
+
+// Of the C library, which has no header for it. CommandLineToArgvW does the same, but its library starts all of the
+// window system: most of the time of a short run.
+extern "C" int __cdecl __wgetmainargs(int* count, wchar_t*** words, wchar_t*** environment, int expandsWildcards,
+                                      int* mode);
 
 namespace qrex::platform {
 
@@ -31,8 +36,12 @@ uint64_t PerformanceFrequency() {
 }
 
 std::array<uint8_t, 16> MakeUuid() {
+  using Create = RPC_STATUS(RPC_ENTRY*)(UUID*);
+  std::string error;  // the library is always there, but few runs need it, with all that it brings along
+  static const auto create =
+      reinterpret_cast<Create>(FindSymbol(LoadDynamicLibrary("rpcrt4.dll", error), "UuidCreate"));
   UUID made;
-  UuidCreate(&made);  // one that is good on this machine alone serves, too
+  create(&made);  // one that is good on this machine alone serves, too
   std::array<uint8_t, 16> bytes;
   auto put = [at = bytes.begin()](auto value) mutable {
     for (size_t i = sizeof value; i-- > 0;) *at++ = static_cast<uint8_t>(value >> (8 * i));
@@ -70,7 +79,10 @@ std::string CurrentFolder() {
 
 bool GoToFolder(const std::string& path) { return SetCurrentDirectoryW(Wide(path).c_str()) != 0; }
 
-void EndAtOnce(int status) { TerminateProcess(GetCurrentProcess(), static_cast<UINT>(status)); }
+void EndAtOnce(int status) {
+  TerminateProcess(GetCurrentProcess(), static_cast<UINT>(status));
+  ExitProcess(static_cast<UINT>(status));  // for the compiler: the former does not return
+}
 
 WorkingFolder::WorkingFolder() : m_handle(kNoHandle), m_path(CurrentFolder()) {}
 WorkingFolder::~WorkingFolder() = default;
@@ -139,10 +151,10 @@ bool CanRun(const std::string& calledAs) { return !FindProgram(calledAs).empty()
 
 std::vector<std::string> CommandLineWords(int, char**) {
   std::vector<std::string> words;
-  int count = 0;
-  wchar_t** const wide = CommandLineToArgvW(GetCommandLineW(), &count);
+  int count = 0, startup = 0;
+  wchar_t **wide = nullptr, **environment = nullptr;
+  __wgetmainargs(&count, &wide, &environment, 0, &startup);
   for (int i = 0; i < count; ++i) words.push_back(Narrow(wide[i]));
-  LocalFree(wide);
   return words;
 }
 
