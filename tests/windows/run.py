@@ -48,7 +48,7 @@ def units(build):
     return count
 
 
-def program(build):
+def programs(build):
     count = Count("the programs")
     for name in ("Qrex.exe", "qrex-lsp.exe"):
         told = run(["x86_64-w64-mingw32-objdump", "-p", str(build / name)]).stdout.decode()
@@ -171,8 +171,8 @@ def tests_of(script):
     return re.findall(r"^def (test_\w+)", script.read_text(), re.M)
 
 
-def at_twos(count, play, labels):
-    """Two at once; what cannot pass is not tried, what lacks something here says so."""
+def side_by_side(count, play, labels):
+    """One more at once than there are processors, as many wait; what cannot pass is not tried, what lacks something here says so."""
     def play_unless_known(label):
         reason = KNOWN.get(label) or KNOWN.get(label.partition(".")[0])
         if reason:
@@ -182,7 +182,7 @@ def at_twos(count, play, labels):
         if time.monotonic() - begin > LONG:
             print(f"{label} took {time.monotonic() - begin:.0f} s", flush=True)
         return label, *told
-    with ThreadPoolExecutor(2) as pool:
+    with ThreadPoolExecutor((os.cpu_count() or 1) + 1) as pool:
         for label, reason, failure in pool.map(play_unless_known, labels):
             if reason:
                 count.skip(label, reason)
@@ -203,7 +203,7 @@ def play_test(label, program):
 def scripts(program):
     labels = [f"{script.stem.removesuffix('_test')}.{test}" for script in sorted((ROOT / "tests/endtoend").glob("*_test.py"))
               for test in tests_of(script)]
-    return at_twos(Count("end-to-end tests"), lambda label: play_test(label, program), labels)
+    return side_by_side(Count("end-to-end tests"), lambda label: play_test(label, program), labels)
 
 
 def cases(folder):
@@ -211,23 +211,26 @@ def cases(folder):
         done = run([sys.executable, str(folder / "run.py"), "--bin", WRAPPER, "--case", label])
         return None, text_of(done) if done.returncode else None
     labels = [str(path.relative_to(folder).with_suffix("")) for path in sorted(folder.rglob("*.case"))]
-    return at_twos(Count("cases"), play_case, labels)
+    return side_by_side(Count("cases"), play_case, labels)
+
+
+def timed(group):
+    begin = time.monotonic()
+    count = group()
+    count.end(time.monotonic() - begin)
+    return count
 
 
 def main():
     build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
     os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
     folder = sys.argv[3] if len(sys.argv) > 3 else ""
-    counts = []
-    with Bridges(build, Path(binary).parent) as bridges:
-        groups = [lambda: program(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples, compiled.runtime,
-                  lambda: builds(build), lambda: scripts(bridges.program)]
+    with Bridges(build, Path(binary).parent) as bridges, ThreadPoolExecutor(2) as pool:
+        counts = list(pool.map(timed, [lambda: units(build), lambda: programs(build), lambda: bytes_of_both(binary), compiled.examples,
+                                       compiled.runtime, lambda: builds(build)]))
+        counts.append(timed(lambda: scripts(bridges.program)))  # at several at once by themselves
         if folder:
-            groups.append(lambda: cases(Path(folder).resolve()))
-        for group in groups:
-            begin = time.monotonic()
-            counts.append(group())
-            counts[-1].end(time.monotonic() - begin)
+            counts.append(timed(lambda: cases(Path(folder).resolve())))
     met = {name for count in counts for label in count.skipped for name in (label, label.partition(".")[0])}
     gone = [label for label in KNOWN if label not in met and (folder or "/" not in label)]
     print("".join(f"FAILED skipped.txt: there is no {label}\n" for label in gone), end="")
