@@ -182,12 +182,18 @@ def side_by_side(count, play, labels):
         if time.monotonic() - begin > LONG:
             print(f"{label} took {time.monotonic() - begin:.0f} s", flush=True)
         return label, *told
+    failures = {}
     with ThreadPoolExecutor((os.cpu_count() or 1) + 1) as pool:
         for label, reason, failure in pool.map(play_unless_known, labels):
             if reason:
                 count.skip(label, reason)
+            elif failure is None:
+                count.take(label, None)
             else:
-                count.take(label, failure)
+                failures[label] = failure
+    for label, failure in failures.items():  # alone: what asks for times may fail beside others
+        print(f"{label} is tried again, as it failed:\n{failure}", flush=True)
+        count.take(label, play(label)[1])
     return count
 
 
