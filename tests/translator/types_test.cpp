@@ -76,17 +76,6 @@ TEST_F(TypesTest, Codes) {
 }
 
 TEST_F(TypesTest, UnreflectedTypesStayText) {
-  const std::pair<std::string, std::string> cases[] = {
-      {"int", "int"},
-      {"unsigned*", "unsigned*"},
-      {"std::vector< std::map<int,K>> const& x", "std::vector< std::map<int,K>> const&"},
-      {"n::Unknown", "n::Unknown"},
-      {"const typename X::Inner* x", "typename X::Inner const*"},
-      {"K<int>", "K<int>"},
-      {"K", "K"},
-      {"xvector<DWORD>", "vesk::xvector<DWORD>"},
-  };
-  for (const auto& [text, spelling] : cases) EXPECT_EQ(spelling, TypeText(CodeOf(text, false))) << text;
   EXPECT_EQ("27 03 69 6e 74", Hex(CodeOf("int", false)));
   EXPECT_EQ("20 01 4b", Hex(CodeOf("K", false)));
 }
@@ -126,27 +115,12 @@ TEST_F(TypesTest, Signatures) {
   EXPECT_EQ("e1 a2 01 00 00 00", Hex(signature.metadata));
 }
 
+// The spelling; of reflected types also the mangled one and the destructor.
 TEST_F(TypesTest, Spellings) {
-  const std::array<std::string, 4> cases[] = {
-      {"int8", "vesk::int8", "int8", ""},
-      {"void", "void", "void", ""},
-      {"string16", "vesk::string16", "string16", "vesk::string16::~basic_xstring"},
-      {"const K* const&", "K const* const&", "ref_ptr_K", ""},
-      {"n::S", "n::S", "n_S", "n::S::~S"},
-      {"xvector<int32>", "vesk::xvector<vesk::int32>", "xvector_int32", "vesk::xvector<vesk::int32>::~xvector"},
-      {"xset<xvector<K>>", "vesk::xset<vesk::xvector<K> >", "xset_xvector_K", "vesk::xset<vesk::xvector<K>>::~xset"},
-      {"xvector<movable<pref<n::I>>>", "vesk::xvector<vesk::pref<n::I>>", "xvector_pref_n_I",
-       "vesk::xvector<vesk::pref<n::I>>::~xvector"},
-      {"xmap<string8,xset<int8>>", "vesk::xmap<vesk::string8,vesk::xset<vesk::int8> >", "map_string8_xset_int8",
-       "vesk::xmap<vesk::string8,vesk::xset<vesk::int8> >::~xmap"},
-      {"K x[3]", "vesk::Array<K,3>", "array3_K", "vesk::Array<K,3>::~Array"},
-      {"xvector<int8 : [1]> : [2]", "vesk::xvector<vesk::int8>", "xvector_int8", "vesk::xvector<vesk::int8>::~xvector"},
-  };
-  for (const auto& [text, spelling, mangled, destructor] : cases) {
-    const TypeCode code = CodeOf(text);
-    EXPECT_EQ(spelling, TypeText(code));
-    EXPECT_EQ(mangled, MangledType(code));
-    EXPECT_EQ(destructor, QualifiedDestructorText(code));
+  for (const auto& [form, text, spellings] : TextCasesOf("translator/spellings.txt")) {
+    const TypeCode code = CodeOf(text, form == "reflected");
+    const std::string others = "\n" + MangledType(code) + "\n" + QualifiedDestructorText(code);
+    EXPECT_EQ(spellings, TypeText(code) + (form == "reflected" ? others : "")) << text;
   }
   MemoryTextWriter out;
   PrintDeclaration(out, CodeOf("K"), "x", DeclarationMode::Reference);
@@ -219,29 +193,12 @@ TEST_F(TypesTest, FieldTypes) {
 // --- Byte code: the codes above with each name as an index into the string table of the record.
 
 TEST_F(TypesTest, ByteCode) {
-  const std::string fifteen = "0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,";
-  const std::array<std::string, 3> cases[] = {
-      // the type, its bytes, and the strings that it adds
-      {"xmap<string8,const int8*[259]>", "0x51,0x10,0x50,0x03,0x01,0x00,0x00,0x35,0x31,0x02", ""},
-      {"xmap<n::S,xvector<E>>", "0x51,0x20,0x00,0x00,0x44,0x23,0x01,0x00", "    \"n::S\",\n    \"E\",\n"},
-      {"n::T*", "0x35,0x22,0x02,0x00", "    \"n::T\",\n"},
-      {"n::S&", "0x36,0x20,0x00,0x00", ""},
-      {"int32 : [7, \"x\\n\", true, 1.0, f(E)]",
-       "0xe5,0xa2,0x07,0x00,0x00,0x00,0xa4,0x03,0x00,0xa1,0x01,0xa3,0x00,0x00,0x00,0x00,\n"
-       "    0x00,0x00,0xf0,0x3f,0xc1,0x04,0x00,0xc0,0x01,0x00,0x04",
-       "    \"x\\n\",\n    \"f\",\n"},
-      {"int32" + std::string(15, '*'), fifteen + "0x04", ""},
-      {"int32" + std::string(16, '*'), fifteen + "0x35,\n    0x04", ""},
-  };
-  StringTable strings;
-  std::string added;
-  MemoryTextWriter out;
-  for (const auto& [text, bytes, names] : cases) {
+  StringTable strings;  // to which each type adds its own
+  for (const auto& [name, text, expected] : TextCasesOf("translator/byte_code.txt")) {
+    MemoryTextWriter out;
     WriteTypeByteCode(out, "A", strings, CodeOf(text));
-    EXPECT_EQ("static const vesk::octet_t A[] =\n{\n    " + bytes + "\n};\n", out.TakeText()) << text;
-    added += names;
     WriteStringTable(out, strings, "N");
-    EXPECT_EQ(added.empty() ? "" : "static vesk::ConstStringZ N_stringTable[] =\n{\n" + added + "};\n", out.TakeText());
+    EXPECT_EQ(expected + "\n", out.TakeText()) << text;
   }
 }
 
