@@ -156,12 +156,8 @@ namespace {
 
 // An archive of WriteObject in the given releases of the two projects.
 Bytes HolderBytes(int kindsRelease, Bytes const& size) {
-    Bytes bytes = {0xFF, 'v', 'x', 2, 2, 5, 'c', 'h', 'e', 'c', 'k', 1, 5, 'k', 'i', 'n', 'd', 's'};
-    bytes.push_back(vesk::octet_t(kindsRelease));
-    for (Bytes const& part : {Bytes{0, 2, 6, 'H', 'o', 'l', 'd', 'e', 'r', 1}, size, Bytes{8, 0, 0, 0}}) {
-        bytes.insert(bytes.end(), part.begin(), part.end());
-    }
-    return bytes;
+    const Bytes projects = {0xFF, 'v', 'x', 2, 2, 5, 'c', 'h', 'e', 'c', 'k', 1, 5, 'k', 'i', 'n', 'd', 's', vesk::octet_t(kindsRelease)};
+    return Joined(projects, Bytes{0, 2, 6, 'H', 'o', 'l', 'd', 'e', 'r', 1}, size, Bytes{8, 0, 0, 0});
 }
 
 vesk::xstring ReadHolder(Bytes const& bytes) {
