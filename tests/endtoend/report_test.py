@@ -97,12 +97,13 @@ def test_trace_of_a_run_that_fails(workspace):
         holds(run.communicate(timeout=60)[0], "Interrupted")
     holds(str(spans(workspace)), "core/src/one.cpp")
     workspace.write("tree/core/src/one.cpp", "mute\n")
+    workspace.append("tree/core/src/two.cpp", "wrong\n")  # which the tool tells itself
     log = workspace.run("all.qrex", REPORT, "keepGoing=true", status=1)
     found = page_data(workspace)
     equal((found["completed"], found["warnings"], found["errors"]), (True, *counted(log)))
     errors = {message["text"]: message for message in found["messages"] if message["severity"] == "error"}
     mute, broken = "core/src/one.cpp: the tool ended with status 3", "error : @import of IObject.h required"
-    equal((set(errors), len(errors)), ({mute, broken}, found["errors"]))
+    equal((set(errors), len(errors)), ({mute, broken, "error: bad"}, found["errors"]))
     equal((errors[broken]["path"], errors[broken]["lines"]), ("app/src/app.cpp", [[1, "$class+ Broken {"]]))
     workspace.run("all.qrex", REPORT, status=1)
     equal(page_data(workspace)["completed"], False)
