@@ -82,21 +82,17 @@ TEST_F(ConfigTest, Variables) {
 }
 
 TEST_F(ConfigTest, TargetDirectory) {
-  const struct {
-    const char *value, *platform, *config;
-  } kRows[] = {
-      {"\"build/x64/Release\"", "x64", "Release"},
-      {"path \"a/b/Win32/Debug/\"", "Win32", "Debug"},
-      {"\"a\\\\b\\\\c\"", "b", "c"},
-      {"\"/x/y\"", "x", "y"},
-      {"\"x\"", "p", "c"},
-      {"\"x/y\"", "p", "c"},
-      {"\"/y\"", "p", "c"},
-      {"\"\"", "p", "c"},
-  };
-  for (const auto& row : kRows) {
-    Load(std::string("platform = \"p\" config = \"c\" $TARGET_DIR = ") + row.value);
-    EXPECT_EQ(std::string(row.platform) + "|" + row.config, Got().platform + "|" + Got().config) << row.value;
+  const std::pair<std::string, const char*> kRows[] = {{"\"build/x64/Release\"", "x64|Release"},
+                                                       {"path \"a/b/Win32/Debug/\"", "Win32|Debug"},
+                                                       {"\"a\\\\b\\\\c\"", "b|c"},
+                                                       {"\"/x/y\"", "x|y"},
+                                                       {"\"x\"", "p|c"},
+                                                       {"\"x/y\"", "p|c"},
+                                                       {"\"/y\"", "p|c"},
+                                                       {"\"\"", "p|c"}};
+  for (const auto& [value, expected] : kRows) {
+    Load("platform = \"p\" config = \"c\" $TARGET_DIR = " + value);
+    EXPECT_EQ(expected, Got().platform + "|" + Got().config) << value;
   }
 }
 

@@ -166,9 +166,7 @@ vesk::xstring SizeText(vesk::InputArchive& input, Read read) {
 struct ReadsAnother {
     void Deserialise(vesk::InputArchive& ar) {
         ar >> first;
-        vesk::Archive written;
-        written << Doc();
-        vesk::InputArchive another(written);
+        vesk::InputArchive another(Written(Doc()));
         Doc doc;
         another >> doc;
         ar >> second;

@@ -113,9 +113,7 @@ ROW(templates) {
     CHECK(concrete.added + concrete.plain, 7);
 
     // A class writes the release of its project ahead of its model.
-    vesk::Archive ar;
-    ar << box;
-    CHECK(ar.m_bytes.size(), 1 + 4 + 2);
+    CHECK(Written(box).size(), 1 + 4 + 2);
 
     const auto old = ReadAs<Old<int>>({1, 5, 0, 0, 0});
     CHECK(vxMakeString(old.a << old.b), "56");
@@ -363,9 +361,8 @@ ROW(exceptions) {
     const vesk::string8 before(100, 'b');
     for (Held const& other : {Held(Held::inPlace(100)), Held(Held::onHeap(100))}) {
         Held held = before;
-        vesk::Archive ar;
-        ar << other;
-        vesk::InputArchive reads(ar), makes(ar);
+        const Bytes bytes = Written(other);
+        vesk::InputArchive reads(bytes), makes(bytes);
         CHECK(Throws([&] { reads >> held; }), true);
         Fragile::s_fails = true;
         CHECK(Throws([&] { held = other; }), true);
