@@ -82,21 +82,17 @@ TEST_F(ConfigTest, Variables) {
 }
 
 TEST_F(ConfigTest, TargetDirectory) {
-  const struct {
-    const char *value, *platform, *config;
-  } kRows[] = {
-      {"\"build/x64/Release\"", "x64", "Release"},
-      {"path \"a/b/Win32/Debug/\"", "Win32", "Debug"},
-      {"\"a\\\\b\\\\c\"", "b", "c"},
-      {"\"/x/y\"", "x", "y"},
-      {"\"x\"", "p", "c"},
-      {"\"x/y\"", "p", "c"},
-      {"\"/y\"", "p", "c"},
-      {"\"\"", "p", "c"},
-  };
-  for (const auto& row : kRows) {
-    Load(std::string("platform = \"p\" config = \"c\" $TARGET_DIR = ") + row.value);
-    EXPECT_EQ(std::string(row.platform) + "|" + row.config, Got().platform + "|" + Got().config) << row.value;
+  const std::pair<std::string, const char*> kRows[] = {{"\"build/x64/Release\"", "x64|Release"},
+                                                       {"path \"a/b/Win32/Debug/\"", "Win32|Debug"},
+                                                       {"\"a\\\\b\\\\c\"", "b|c"},
+                                                       {"\"/x/y\"", "x|y"},
+                                                       {"\"x\"", "p|c"},
+                                                       {"\"x/y\"", "p|c"},
+                                                       {"\"/y\"", "p|c"},
+                                                       {"\"\"", "p|c"}};
+  for (const auto& [value, expected] : kRows) {
+    Load("platform = \"p\" config = \"c\" $TARGET_DIR = " + value);
+    EXPECT_EQ(expected, Got().platform + "|" + Got().config) << value;
   }
 }
 
@@ -149,37 +145,13 @@ TEST_F(ConfigTest, Imports) {
               "\nbad(2) : Invalid option : bad\n\nmain.qrex(3) : while processing @import of bad\n");
 }
 
+// What is missing, step by step; the last addition counts.
 TEST_F(ConfigTest, Validation) {
-  const std::string missing = "\nERROR:  Missing setting: ";
-  const struct {
-    std::string addition, message;
-  } kSteps[] = {
-      {"", missing + "'virtualTree' not specified\n"},
-      {"virtualTree = { \"t\" }", missing + "$EXPORT_LIB not specified\n"},
-      {"$EXPORT_LIB = \"l\"", missing + "$EXPORT_TRANSLATED_INCLUDE not specified\n"},
-      {"$EXPORT_TRANSLATED_INCLUDE = \"i\"", missing + "$EXPORT_UNTRANSLATED_INCLUDE not specified\n"},
-      {"$EXPORT_UNTRANSLATED_INCLUDE = \"i\"",
-       "\nERROR:  $EXPORT_TRANSLATED_INCLUDE and $EXPORT_UNTRANSLATED_INCLUDE both equal i\n"},
-      {"$EXPORT_UNTRANSLATED_INCLUDE = \"u\"", missing + "'workspace' not specified\n"},
-      {"workspaces = { \"w\" }", missing + "'config' not specified\n"},
-      {"mode = gen", ""},
-      {"mode = build config = \"c\"", missing + "'platform' not specified\n"},
-      {"platform = \"p\"", "\nERROR:  PATH, INCLUDE, LIB not set for platform p\n"},
-      {"mode = clean", ""},
-      {"mode = show", ""},
-      {"mode = build translateOnly = true", ""},
-      {"mode = compile", "\nERROR:  PATH, INCLUDE, LIB not set for platform p\n"},
-      {"LIB(\"p\") = { \"l\" }", "\nERROR:  PATH not specified for platform p\n"},
-      {"PATH(\"p\") = { \"l\" }", "\nERROR:  INCLUDE not specified for platform p\n"},
-      {"INCLUDE(\"p\") = { \"l\" } LIB(\"p\") = { }", "\nERROR:  LIB not specified for platform p\n"},
-      {"LIB(\"p\") = { \"l\" }", missing + "'COMPILE_FILE_PATH' not specified\n"},
-      {"$COMPILE_FILE_PATH = \"x.cpp\"", ""},
-  };
   std::string text;
-  for (const auto& step : kSteps) {
-    text += step.addition + "\n";
+  for (const auto& [name, addition, message] : TextCasesOf("driver/cases/validation.txt")) {
+    text += addition + "\n";
     Load(text);
-    EXPECT_EQ(step.message, ValidateSettings(Got())) << step.addition;
+    EXPECT_EQ(message.empty() ? "" : "\n" + message + "\n", ValidateSettings(Got())) << addition;
   }
 }
 

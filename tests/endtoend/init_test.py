@@ -6,11 +6,7 @@ import re
 import shutil
 import subprocess
 
-from workspace_fixture import COMPILERS, ROOT, equal, holds, in_workspace, run_tests
-
-
-def contents(folder):
-    return {str(path.relative_to(folder)): path.read_bytes() for path in folder.rglob("*") if path.is_file()}
+from workspace_fixture import COMPILERS, ROOT, contents, equal, holds, in_workspace, run_tests
 
 
 @in_workspace({}, "git")
@@ -59,7 +55,7 @@ def test_nothing_is_overwritten(workspace):
         holds(workspace.run("--init", name, status=1), "can't name a workspace")
     for arguments in ((), ("a", "b", "c")):
         equal(workspace.run("--init", *arguments, status=1), "Usage: Qrex --init NAME [FOLDER]\n")
-    equal(contents(workspace.folder), {"zoo/tree/common.inc": b"mine\n"})
+    equal(contents(workspace.folder, "**/*"), {"zoo/tree/common.inc": b"mine\n"})
 
 
 @in_workspace({})

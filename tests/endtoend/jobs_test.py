@@ -7,7 +7,7 @@ import signal
 import subprocess
 import time
 
-from workspace_fixture import comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
+from workspace_fixture import comparable, contents, equal, holds, in_workspace, lacks, project, run_tests, stand_ins, workspace_of
 
 # Takes the longer the earlier its source comes, so that ends come in another order; notes how many run at once.
 COMPILING = """touch "running/$$"; ls running | wc -l >> most; echo half > "$object"
@@ -38,17 +38,12 @@ def told(text):
     return re.sub(r"[\w/]*(compiler|\.o)\.rsp", "RSP", comparable(text))
 
 
-def left(workspace):
-    return {name: workspace.path(name).read_bytes() for pattern in ("x64/**/*", "out/**/*", "qrexsource/**/*.cpp")
-            for name in workspace.times(pattern) if workspace.path(name).is_file()}
-
-
 def compare(workspace, *arguments, status=0):
     outcomes = []
     for jobs in ("1", "4", "0"):
         workspace.shell("rm -rf x64 out qrexsource most running/*")
         log = workspace.run("all.qrex", f"jobs={jobs}", *arguments, status=status)
-        outcomes.append((told(log), left(workspace)))
+        outcomes.append((told(log), contents(workspace.folder, "x64/**/*", "out/**/*", "qrexsource/**/*.cpp")))
         most = max(map(int, workspace.path("most").read_text().split()))
         assert most == 1 if jobs == "1" else 1 < most <= 4 or jobs == "0", f"{most} at once with {jobs} jobs"
     for outcome in outcomes[1:]:

@@ -1,8 +1,8 @@
 #!/usr/bin/env python3
 """A run that keeps going behind errors of translations: all are told, and what they do not touch is made."""
 
-from workspace_fixture import (Workspace, comparable, equal, holds, in_workspace, lacks, project, run_tests, stand_ins,
-                               workspace_of)
+from workspace_fixture import (Workspace, comparable, contents, equal, holds, in_workspace, lacks, project, run_tests,
+                               stand_ins, workspace_of)
 
 PROJECTS = {  # kind, subprojects, public headers, sources
     "core": ("Static Library", "", ("good.h", "bad.h", "over.h"), ("core.cpp", "fine.cpp")),
@@ -27,8 +27,8 @@ def files():
 
 
 def made(workspace):
-    return {name: workspace.path(name).read_bytes() for name in workspace.times("**/*")
-            if workspace.path(name).is_file() and name.startswith(("x64", "out", "qrexsource")) and ".qrexdep" not in name}
+    files = contents(workspace.folder, "x64/**/*", "out/**/*", "qrexsource/**/*")
+    return {name: content for name, content in files.items() if ".qrexdep" not in name}
 
 
 @in_workspace(files())

@@ -136,8 +136,8 @@ class Workspace:
     def write(self, name, text):
         path = self.path(name)
         path.parent.mkdir(parents=True, exist_ok=True)
-        path.write_text(text)
-        if text.startswith("#!"):
+        path.write_bytes(text if isinstance(text, bytes) else text.encode())
+        if text[:2] == "#!":
             path.chmod(path.stat().st_mode | stat.S_IXUSR)
 
     def append(self, name, text):
@@ -153,6 +153,11 @@ class Workspace:
         """Replaces a text, later than all that was written before."""
         time.sleep(0.02)
         self.replace(name, old, new)
+
+    def rewrite(self, name, text):
+        """Writes a text, later than all that was written before."""
+        time.sleep(0.02)
+        self.write(name, text)
 
     def clean(self):
         """Removes all that builds have made."""
@@ -181,6 +186,12 @@ class Workspace:
     def changed(self, before, pattern):
         """The files of the pattern that are new or younger than in `before`."""
         return sorted(name for name, time in self.times(pattern).items() if before.get(name) != time)
+
+
+def contents(folder, *patterns):
+    """Name to bytes, of the files that one of the patterns matches."""
+    return {str(path.relative_to(folder)): path.read_bytes() for pattern in patterns for path in folder.glob(pattern)
+            if path.is_file()}
 
 
 def comparable(log):

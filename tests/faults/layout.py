@@ -5,13 +5,10 @@ import errno
 import shutil
 import subprocess
 
+from workspace_fixture import contents
 from workspaces import run
 
 KINDS = {"--init": ["zoo"], "--init, in a folder": ["zoo", "."]}
-
-
-def contents(folder):
-    return {str(path.relative_to(folder)): path.read_bytes() for path in folder.rglob("*") if path.is_file()}
 
 
 def disturbed(binary, library, folder, arguments, expected, call, at, how, number):
@@ -22,13 +19,13 @@ def disturbed(binary, library, folder, arguments, expected, call, at, how, numbe
         place = f"{call} {at} {how} {errno.errorcode.get(number, '')}: "
         if how != "kill" and done.returncode not in (0, 1):
             return place + f"status {done.returncode}"
-        if done.returncode == 0 and contents(folder) != expected:
+        if done.returncode == 0 and contents(folder, "**/*") != expected:
             return place + "a part, with status 0"
         if done.returncode == 1 and b"rror" not in done.stdout:
             return place + f"without a message: {done.stdout}"
         if done.returncode != 0:
             again = run(binary, folder, "--init", *arguments)
-            if contents(folder) != expected:
+            if contents(folder, "**/*") != expected:
                 return place + f"not finished by the next call: {again.stdout.decode()[-300:]}"
         return None
     except subprocess.TimeoutExpired:
@@ -43,7 +40,7 @@ def rows(binary, library, folder, faults, points):
         whole, counts = folder / "whole", folder / "counts"
         whole.mkdir()
         run(binary, whole, "--init", *arguments, LD_PRELOAD=library, FAULT_COUNTS=str(counts)).check_returncode()
-        expected = contents(whole)
+        expected = contents(whole, "**/*")
         shutil.rmtree(whole)
         made = {call: int(count) for call, count in (line.split() for line in counts.read_text().splitlines())}
         for call, how, number in faults:

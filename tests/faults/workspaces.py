@@ -6,7 +6,7 @@ import subprocess
 from pathlib import Path
 
 from signals import PAUSE
-from workspace_fixture import SETTINGS, stand_ins
+from workspace_fixture import project, stand_ins, workspace_of
 
 
 def run(binary, folder, *arguments, **environment):
@@ -26,30 +26,21 @@ def build_library(folder, name):
 CLASSES = "".join(f"$struct+ S{i} {{ $int32 a; $int32 b; $int32 c; }};\n" for i in range(700))  # above 256 KiB of text
 
 
-def project(target, files, extra=""):
-    return (f'$TARGET_TYPE = "{target}"\n$ROOT_TO_PROJDIR = "@dirname"\nqrex\nconfig {{ "Debug|x64" }}\n'
-            f"{extra}{files}\n")
-
-
 def gcc():
-    library = project("Static Library", '{ "zoo.h" "big.h" "notes.txt" "src" { "zoo.cpp" "big.cpp" } }')
-    program = project("Console Application", '{ "src" { "app.cpp" "more.cpp" } }', 'subproj { "zoo" }\n')
     tools = stand_ins("out=$object\n" + PAUSE, *["out=$target\n" + PAUSE] * 2)
     return {
-        "all.qrex": SETTINGS + 'makeExportedHeaderFilesReadOnly = true\nmakeTranslatedFilesReadOnly = true\n',
-        "tree/.qrwsroot": "",
-        "tree/all.qrws": '"all" { "Vesk/vxObject" "zoo" "app" }\n',
+        **workspace_of("Vesk/vxObject", "zoo", "app",
+                       settings="makeExportedHeaderFilesReadOnly = true\nmakeTranslatedFilesReadOnly = true\n"),
         "tree/Vesk/vxObject/IObject.h": "namespace vesk { $interface+ IObject { }; $interface+ IPersistable : IObject { }; }\n",
         "tree/Vesk/vxObject/src/vxObject.cpp": '@import "Vesk/vxObject/IObject.h"\n',
-        "tree/Vesk/vxObject/src/vxObject.qrpj": project("Static Library", '{ "IObject.h" "src" { "vxObject.cpp" } }')
-        .replace("@dirname", "Vesk/vxObject"),
-        "tree/zoo/src/zoo.qrpj": library.replace("@dirname", "zoo"),
+        "tree/Vesk/vxObject/src/vxObject.qrpj": project("Static Library", "Vesk/vxObject", '"IObject.h" "src" { "vxObject.cpp" }'),
+        "tree/zoo/src/zoo.qrpj": project("Static Library", "zoo", '"zoo.h" "big.h" "notes.txt" "src" { "zoo.cpp" "big.cpp" }'),
         "tree/zoo/zoo.h": '@import "Vesk/vxObject/IObject.h"\n@def legs = 4\n$enum+ Food { hay, fish };\n',
         "tree/zoo/big.h": '@import "Vesk/vxObject/IObject.h"\n' + CLASSES,
         "tree/zoo/notes.txt": "plain\n" * 3000,
         "tree/zoo/src/zoo.cpp": '@import "zoo/zoo.h"\nint legsOfAll = legs;\n',
         "tree/zoo/src/big.cpp": '@import "zoo/big.h"\n',
-        "tree/app/src/app.qrpj": program.replace("@dirname", "app"),
+        "tree/app/src/app.qrpj": project("Console Application", "app", '"src" { "app.cpp" "more.cpp" }', 'subproj { "zoo" }'),
         "tree/app/src/app.cpp": '@import "zoo/zoo.h"\n$init { }\nint main() { return legs; }\n',
         "tree/app/src/more.cpp": "int more;\n",
         "tools/lead": '#!/bin/sh\n"$@"\n',

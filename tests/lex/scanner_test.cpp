@@ -74,24 +74,13 @@ TEST(ScannerTest, Strings) {
 }
 
 TEST(ScannerTest, QuotedText) {
-  const auto read = [](const std::string& text) {
-    return Outcome(text, [&](LexScanner& scanner) {
-      std::string out;
-      ReadQuotedText(scanner, out);
-      return out + " up to " + scanner.Text();
-    });
-  };
-  EXPECT_EQ("a\tA'b up to \" c", read("\"a\\t\\x41'b\" c"));
-  EXPECT_EQ(" up to '", read("''"));
-  EXPECT_EQ("Expected quoted string at 0", read(""));
-  EXPECT_EQ("Expected quoted string at 1", read("\""));
-  EXPECT_EQ("ab c isn't a quoted string at 0", read("ab c"));
-  EXPECT_EQ("Met EOS in middle of string at 2", read("\"a"));
-  EXPECT_EQ("Met EOS in middle of string at 2", read("\"\\"));
-  EXPECT_EQ("Met end of line in middle of string at 2", read("\"a\n\""));
-  EXPECT_EQ("'q'is not a valid escape character at 2", read("\"\\q\""));
-  EXPECT_EQ("Expected hex character when reached EOS at 3", read("\"\\x"));
-  EXPECT_EQ("Expected hex character when read 'g' at 4", read("\"\\x4g\""));
+  for (const auto& [name, text, expected] : TextCasesOf("lex/cases/quoted_text.txt")) {
+    EXPECT_EQ(expected, Outcome(text, [](LexScanner& scanner) {
+                std::string out;
+                ReadQuotedText(scanner, out);
+                return out + " up to " + scanner.Text();
+              }));
+  }
 }
 
 TEST(ScannerTest, LinesAndEquality) {

@@ -42,14 +42,7 @@ TEST_F(DirectivesTest, CppText) {
   frame.dialect = Dialect::Cpp;
   frame.DefineSubstitution("v", "1");
   frame.AddVariable(std::make_unique<LSVar>("m", "M"));
-  EXPECT_EQ("R\"(m $(v) @if })\" u8\"m 1\" 1'0 M // m", Expand("R\"(m $(v) @if })\" u8\"m $(v)\" 1'0 m // m"));
-  EXPECT_EQ("#error don't { M\nM", Expand("#error don't { M\nm"));
-  EXPECT_EQ("[R\"(,)\"][1'0,]", Expand("@def f(a, b) = [a][b]\nf(R\"(,)\", `1'0,`)"));
-  EXPECT_EQ("  R\"(\n a\n)\";\n  b", Expand("  @scope\n{\n    R\"(\n a\n)\";\n    b\n}"));
-  EXPECT_EQ("[R\"(\n})\"]", Expand("@def r = [R\"(\n})\"]\nr"));
-  EXPECT_EQ("yes a\\", Expand("@if (R\"a\\\" == \"a\\\\\") yes@@ @(R\"a\\\")"));
-  EXPECT_EQ("t(4) : Expected digit (not ')') after decimal point (ie after reading '1.')",
-            Expand("R\"(\n\n)\"\n@(1.)"));
+  for (const auto& [name, text, expected] : TextCasesOf("macro/cases/cpp_text.txt")) EXPECT_EQ(expected, Expand(text));
 }
 
 TEST_F(DirectivesTest, Prints) {

@@ -6,6 +6,7 @@
 
 #include "macro/expand.h"
 #include "message_of.h"
+#include "text_cases.h"
 
 namespace qrex {
 namespace {
@@ -37,26 +38,9 @@ class PythonTest : public ::testing::Test {
 };
 
 TEST_F(PythonTest, ValuesAsText) {
-  const std::pair<const char*, const char*> rows[] = {
-      {"6 * 7", "42"},
-      {"int(-2 ** 31)", "-2147483648"},
-      {"2 ** 40 + 5", "5"},  // 32 bits
-      {"True", "1"},
-      {"0.1 + 0.2", "0.3"},
-      {"1e20", "1e+20"},
-      {"'a' + \"b\"", "ab"},
-      {"[]", "[]"},
-      {"[[1, 2], [3], 'x', 1.5]", "[[1,2],[3],x,1.5]"},
-      {"type('Count', (int,), {})(3)", "3"},
-      {"type('Name', (str,), {})('n')", "n"},
-      {"None", "Can't convert python result of type NoneType"},
-      {"[1, [None]]", "Can't convert python result of type NoneType"},
-      {"(1, 2)", "Can't convert python result of type tuple"},
-      {"10L", "Can't convert python result of type long"},
-      {"u'text'", "Can't convert python result of type unicode"},
-      {"{}", "Can't convert python result of type dict"},
-  };
-  for (const auto& [expression, text] : rows) EXPECT_EQ(Eval(expression), text) << expression;
+  for (const auto& [name, expression, text] : TextCasesOf("macro/cases/python_values.txt")) {
+    EXPECT_EQ(Eval(expression), text) << expression;
+  }
   Run("endless = []\nendless.append(endless)\n");
   EXPECT_EQ(Eval("endless"), "Python list nested too deeply");
 }

@@ -42,22 +42,5 @@ TEST_F(TraceFileTest, ToolsTakeTheFirstFreeSlot) {
   EXPECT_TRUE(holds("\"output\":\"c.o\",\"why\":\"tree/t.h was newer\",\"failed\":true}")) << text;
 }
 
-TEST_F(TraceFileTest, AToolThatSaysNothingOfItsFailureIsOneError) {
-  BuildRecord record(TraceMessages());
-  record.ToolBegins(0, Compiling("a"));
-  record.ToolBegins(1, Compiling("b"));
-  record.ToolEnds(1, {.code = 3});
-  record.ToolEnds(0, {.code = 1});
-  record.Take(ToolMessage{Severity::Error, "a.cpp:1: error: x", {"a.cpp", 1}, {}});
-  record.StepIsOver(0, false);
-  record.StepIsOver(1, false);
-  record.Take(Message(Severity::Warning, "warning W1 : ", "odd").At({"t.h", 3}));
-  ASSERT_EQ(3u, record.messages.size());
-  EXPECT_EQ("a.cpp:1: error: x", record.messages[0].text);
-  EXPECT_EQ("app/src/b.cpp: the tool ended with status 3", record.messages[1].text);
-  EXPECT_EQ("warning W1 : odd", record.messages[2].text);
-  EXPECT_NE("", trace);  // passed on
-}
-
 }  // namespace
 }  // namespace qrex

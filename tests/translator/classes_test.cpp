@@ -1,5 +1,6 @@
 // Class statements: whole headers and tails, each variation of the head and the members, and all that may be wrong.
 
+#include "text_cases.h"
 #include "translator/translate_fixture.h"
 
 namespace qrex {
@@ -15,48 +16,20 @@ class ClassesTest : public TranslateTest {
   }
 };
 
-// The heads of definitions: what stands between `struct` and the body.
+// What stands between `struct` and the body of definitions, and whole texts of declarations.
 TEST_F(ClassesTest, Heads) {
-  const std::pair<std::string, std::string> cases[] = {
-      {"$struct A { };", "struct A\n{"},
-      {"$struct A final { };", "struct A final\n{"},
-      {"$class A : public B, virtual_base::C<x> { };", "class A : public B, virtual_base::C<x>\n\n{"},
-      {"$class A isa vesk::IObject { };",
-       "class A : public vesk::IObjectBaseMixin<A,vesk::EmptyBase>\n{\npublic:\n"
-       "    typedef vesk::IObjectBaseMixin<A,vesk::EmptyBase> BaseClass;\n"},
-      {"$struct A isa vesk::IPersistable : B { };",
-       "struct A : public vesk::PersistableMixin<vesk::IObjectBaseMixin<A,vesk::EmptyBase>>,B\n\n{\n    typedef "},
-      {"$struct A<class T> isa vesk::IObject { };",
-       "template <class T>\nstruct A : public vesk::IObjectBaseMixin<A<T>,vesk::EmptyBase>\n{\n    typedef "},
-      {"$struct A : mixin [ ] { };", "struct A : public vesk::BaseMixin<A,vesk::EmptyBase>\n{\n    typedef "},
-      {"$struct A : B mixin [ ? M] C, D : [ 7 ] { };",
-       "struct A : public M<vesk::BaseMixin<A,A__BASE> >\n,C, D\n{\n    typedef "},
-      {"$struct A : [ 1 ] { };", "struct A\n{"},
-      {"$mixin M { };", "template <typename BC>\nstruct M : public BC\n{\n    typedef BC BaseClass;\n"},
-      {"$mixin M<int N, class T> : B { };",
-       "template <typename BC,int N, class T>\nstruct M : public BC,B\n\n{\n    typedef BC BaseClass;\n"},
-      {"$mixin M : B mixin [ ? X ] { };",
-       "template <typename BC>\nstruct M__BASE : BC,B {};\ntemplate <typename BC>\nstruct M : public X <M__BASE<BC> >"
-       "\n\n{\n    typedef X <M__BASE<BC> > BaseClass;\n "},
-  };
-  for (const auto& [text, head] : cases) EXPECT_EQ(head, ClassText(text).substr(0, head.size())) << text;
+  for (const auto& [form, text, expected] : TextCasesOf("translator/class_heads.txt")) {
+    if (form == "head") {
+      EXPECT_EQ(expected, ClassText(text).substr(0, expected.size())) << text;
+    } else {
+      EXPECT_EQ(expected + "\n", TranslateHeader(text).header) << text;
+    }
+  }
   EXPECT_EQ("struct A__BASE : public B, C {};\nstruct A;\n",
             Section(TranslateHeader("$struct A : public B, C mixin [ ] { };").header, "", "\nnamespace vesk"));
 }
 
 TEST_F(ClassesTest, ForwardAndDeferred) {
-  const std::pair<std::string, std::string> cases[] = {
-      {"$class A; $class A;", "class A;\n class A;\n"},
-      {"$model A; $adt B;", "struct A;\n struct B;\n"},
-      {"$mixin M; $mixin M2<int N>;", "template <typename BC> struct M;\n template <typename BC,int N> struct M2;\n"},
-      {"$struct A<class T>;", "template <class T> struct A;\n"},
-      {"$struct A <<os>>;",
-       "struct A;\n\ninline vesk::xostream& operator<<(vesk::xostream& _os,A const& _x) "
-       "{ ((A&)_x).Write(_os); return _os; }\n"},
-      {"$struct+ A <<extern>>;",
-       "vesk::ReflectedClass const& _GetReflected(A const*);\nvesk::TypeOps const& _GetTypeOps(A const*);\n"},
-  };
-  for (const auto& [text, header] : cases) EXPECT_EQ(header, TranslateHeader(text).header) << text;
   // A definition behind a deferred declaration doesn't declare the record functions again.
   const std::string header = TranslateHeader("$struct+ A <<os>>; $struct+ A { };").header;
   EXPECT_EQ(header.find("_GetTypeOps(A const*);"), header.rfind("_GetTypeOps(A const*);"));

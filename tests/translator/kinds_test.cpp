@@ -1,5 +1,6 @@
 // Kinds of declarations beyond the cases: variations of small parts of their texts, and what is told in libraries.
 
+#include "text_cases.h"
 #include "translator/translate_fixture.h"
 
 namespace qrex {
@@ -123,17 +124,7 @@ TEST_F(KindsTest, SectionsOfNodesStandOnce) {
 
 // What of its own kind a model may hold: where accessors end, nothing repeats.
 TEST_F(KindsTest, ModelsOfTheirOwnKind) {
-  const std::pair<std::string, std::string> kModels[] = {
-      {"$model M { xvector<M> children; };", "    void CreateIntochildren(vesk::ssize_t _i,M const* _src"},
-      {"$model M { int32 v; assignable<DynArray<M> > kids; };", "    void Setkids(vesk::DynArray<M> const& _v) {"},
-      {"$model M { int32 v; $dropped { M old[]; } $schema { 1: +v +old 2: -old } };", "    vesk::int32 v;\n"},
-      {"$struct S { $model { DynArray<S> kids; xmap<string8,S> named; } };",
-       "    void SetkidsElement(vesk::ssize_t _k0,S const& _v) { kids[_k0] = _v; }\n"},
-      {"$struct S { $model { DynArray<S> kids; } };\n$model M { S s; xvector<S> v; };", "void Sets(S const& _v) {"},
-      {"$model M { int32 v; assignable<xvector<M> > kids; };\n$interface I { M a; };",
-       "vesk::xvector<M> (__stdcall *Getakids)(void const* _self);\n"},
-  };
-  for (const auto& [text, expected] : kModels) {
+  for (const auto& [name, text, expected] : TextCasesOf("translator/models_of_their_kind.txt")) {
     const std::string header = TranslateHeader(text).header;
     EXPECT_NE(header.find(expected), header.npos) << text << "\n" << header;
   }

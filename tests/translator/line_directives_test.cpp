@@ -16,12 +16,9 @@ class LineDirectivesTest : public TranslateTest {
   std::string Of(const std::string& text) {
     MakeWorld(App().targetType);
     std::string output = Translate("t.cpp", text);
-    Replace(output, "#line ", "#");
-    Replace(output, " \"tree/app/src/t.cpp\"", "");
+    ReplaceAllInPlace(output, "#line ", "#");
+    ReplaceAllInPlace(output, " \"tree/app/src/t.cpp\"", "");
     return output;
-  }
-  static void Replace(std::string& text, const std::string& what, const std::string& by) {
-    for (size_t at = 0; (at = text.find(what, at)) != text.npos; at += by.size()) text.replace(at, what.size(), by);
   }
 };
 

@@ -1,5 +1,8 @@
 // Types: their codes, their spellings, what they can do, all that may be wrong with them; and their byte code.
 
+#include <functional>
+#include <map>
+
 #include "text_cases.h"
 #include "translator/emit/byte_code.h"
 #include "translator/emit/emit.h"
@@ -43,12 +46,6 @@ class TypesTest : public TranslateTest {
     }
   }
 
-  using Texts = std::vector<std::pair<std::string, std::string>>;
-  template <typename Read>
-  void AssertFaults(const Texts& cases, Read read) {
-    for (const auto& [text, message] : cases) EXPECT_EQ(message.empty() ? "" : "error : " + message, Parse(text, read));
-  }
-
   TypeCode CodeOf(const std::string& text, bool reflected = true) {
     TypeCode code;
     EXPECT_EQ("", Parse(text, [&](QrexParser& parser) {
@@ -79,66 +76,29 @@ TEST_F(TypesTest, Codes) {
 }
 
 TEST_F(TypesTest, UnreflectedTypesStayText) {
-  const std::pair<std::string, std::string> cases[] = {
-      {"int", "int"},
-      {"unsigned*", "unsigned*"},
-      {"std::vector< std::map<int,K>> const& x", "std::vector< std::map<int,K>> const&"},
-      {"n::Unknown", "n::Unknown"},
-      {"const typename X::Inner* x", "typename X::Inner const*"},
-      {"K<int>", "K<int>"},
-      {"K", "K"},
-      {"xvector<DWORD>", "vesk::xvector<DWORD>"},
-  };
-  for (const auto& [text, spelling] : cases) EXPECT_EQ(spelling, TypeText(CodeOf(text, false))) << text;
   EXPECT_EQ("27 03 69 6e 74", Hex(CodeOf("int", false)));
   EXPECT_EQ("20 01 4b", Hex(CodeOf("K", false)));
 }
 
+// What is wrong with a type that has a name, with metadata, and with signatures.
 TEST_F(TypesTest, Faults) {
-  const auto read = [](QrexParser& parser) {
-    if (!parser.ParseTypeWithName(Naming::Required, true)) parser.Fail("no type");
+  const std::map<std::string, std::function<void(QrexParser&)>> readers = {
+      {"type",
+       [](QrexParser& parser) {
+         if (!parser.ParseTypeWithName(Naming::Required, true)) parser.Fail("no type");
+       }},
+      {"metadata",
+       [](QrexParser& parser) {
+         std::string metadata;
+         parser.ParseMetadataList(metadata);
+       }},
+      {"signature", [](QrexParser& parser) { parser.ParseFunctionSignature({.reflected = true}); }},
+      {"argument", [](QrexParser& parser) { parser.ParseFunctionArg({.directions = true, .reflected = true}); }},
   };
-  const Texts cases = {
-      {"1", "no type"},
-      {"const 1", "no type"},
-      {"int x", "Can't accept platform dependent type: int"},
-      {"const unsigned x", "Can't accept platform dependent type: unsigned"},
-      {"__int64 x", "Can't accept platform dependent type: __int64"},
-      {"xvector<BYTE> x", "Can't accept platform dependent type: BYTE"},
-      {"n::xvector<int32> x", "Unrecognised identifier : xvector"},
-      {"K<int32> x", "Error reading '<'. Templates cannot be reflected"},
-      {"int32 1", "Expected identifier after int32 when read 1"},
-      {"int32& x[2]", "Unexpected '[' : arrays on reference type are illegal"},
-      {"int32 x[0]", "Array size must be greater than zero"},
-      {"int32 x[1-2]", "Array size must be greater than zero"},
-      {"int32 x[65536*32768]", "Array size must be greater than zero"},
-      {"int32 x[65536*65536]", "Array size must be greater than zero"},
-  };
-  AssertFaults(cases, read);
+  for (const auto& [form, text, message] : TextCasesOf("translator/type_faults.txt"))
+    EXPECT_EQ(message.empty() ? "" : "error : " + message, Parse(text, readers.at(form))) << text;
   EXPECT_EQ("error : Reached end of stream while scanning for matching >",
             Parse("std::vector<int", [](QrexParser& p) { p.ParseTypeWithName(Naming::None, false); }));
-}
-
-TEST_F(TypesTest, MetadataLimitsAndFaults) {
-  const auto read = [](QrexParser& parser) {
-    std::string metadata;
-    parser.ParseMetadataList(metadata);
-  };
-  auto values = [](int count) {
-    std::string text = "1";
-    for (int i = 1; i < count; ++i) text += ",1";
-    return text;
-  };
-  const Texts cases = {
-      {"[" + values(32) + "]", "Maximum list size exceeded"},
-      {"[f(" + values(32) + ")]", "Maximum functor arglist size exceeded"},
-      {"[1 2]", ", or ] expected in meta-data list when read 2"},
-      {"[4294967296]", "64-bit integer metadata not supported"},
-      {"[[1], [f(2147483648)]]", "64-bit integer metadata not supported"},
-      {"[" + values(31) + "]", ""},
-      {"[f(" + values(31) + "), -2147483648, [[], g()]]", ""},
-  };
-  AssertFaults(cases, read);
 }
 
 TEST_F(TypesTest, Signatures) {
@@ -153,63 +113,14 @@ TEST_F(TypesTest, Signatures) {
   EXPECT_EQ("inline K const& f(E e,vesk::Array<vesk::int32,2> a=g(1, 2),vesk::string8 s=\",)\") const", out.TakeText());
   EXPECT_TRUE(signature.arguments.front().polymorphic);
   EXPECT_EQ("e1 a2 01 00 00 00", Hex(signature.metadata));
-
-  const auto read = [](QrexParser& parser) { parser.ParseFunctionSignature({.reflected = true}); };
-  const Texts cases = {
-      {"1", "Function name expected when read 1"},
-      {"int32 1", "Function name expected when read 1"},
-      {"const (int32 a)", "Function name expected when read ("},
-      {"int32 f;", "Expected ( after f when read ;"},
-      {"int32 f([E e])", "'[' unexpected.  Polymorphic argument not allowed here"},
-      {"int32 f() const", "const specifier on global function prohibited"},
-  };
-  AssertFaults(cases, read);
 }
 
-TEST_F(TypesTest, DirectionsOfRemoteArguments) {
-  const auto read = [](QrexParser& parser) { parser.ParseFunctionArg({.directions = true, .reflected = true}); };
-  const Texts cases = {
-      {"int32 a", "[in] or [out] expected when read int32"},
-      {"[into] int32 a", "in,out,inout or copy expected when read into"},
-      {"[in int32 a", "Expected ] after in when read int32"},
-      {"[in] int32& a", "in parameter a passed by reference"},
-      {"[in] int32* a", "in parameter a : cannot marshall pointer type"},
-      {"[in] int32* const& a", "in parameter a : cannot marshall pointer type"},
-      {"[out] int32 a", "out parameter a must be passed by reference"},
-      {"[inout] int32* a", "out parameter a must be passed by reference"},
-      {"[out] int32 const& a", "out parameter a cannot be passed by const reference"},
-      {"[copy] int32 a", "copy parameter a must be passed by pointer"},
-      {"[copy] int32 const* a", "copy parameter a cannot be passed by pointer to const"},
-      {"[copy] int32** a", "'copy' parameter a : cannot marshall pointer type"},
-  };
-  AssertFaults(cases, read);
-  for (const std::string text : {"[in] int32 a", "[in] K const& a", "[in] K const a", "[out] K& a", "[inout] int32& a",
-                                 "[copy] K* a", "[in] int32 : [1] a"}) {
-    AssertFaults({{text, ""}}, read);
-  }
-}
-
+// The spelling; of reflected types also the mangled one and the destructor.
 TEST_F(TypesTest, Spellings) {
-  const std::array<std::string, 4> cases[] = {
-      {"int8", "vesk::int8", "int8", ""},
-      {"void", "void", "void", ""},
-      {"string16", "vesk::string16", "string16", "vesk::string16::~basic_xstring"},
-      {"const K* const&", "K const* const&", "ref_ptr_K", ""},
-      {"n::S", "n::S", "n_S", "n::S::~S"},
-      {"xvector<int32>", "vesk::xvector<vesk::int32>", "xvector_int32", "vesk::xvector<vesk::int32>::~xvector"},
-      {"xset<xvector<K>>", "vesk::xset<vesk::xvector<K> >", "xset_xvector_K", "vesk::xset<vesk::xvector<K>>::~xset"},
-      {"xvector<movable<pref<n::I>>>", "vesk::xvector<vesk::pref<n::I>>", "xvector_pref_n_I",
-       "vesk::xvector<vesk::pref<n::I>>::~xvector"},
-      {"xmap<string8,xset<int8>>", "vesk::xmap<vesk::string8,vesk::xset<vesk::int8> >", "map_string8_xset_int8",
-       "vesk::xmap<vesk::string8,vesk::xset<vesk::int8> >::~xmap"},
-      {"K x[3]", "vesk::Array<K,3>", "array3_K", "vesk::Array<K,3>::~Array"},
-      {"xvector<int8 : [1]> : [2]", "vesk::xvector<vesk::int8>", "xvector_int8", "vesk::xvector<vesk::int8>::~xvector"},
-  };
-  for (const auto& [text, spelling, mangled, destructor] : cases) {
-    const TypeCode code = CodeOf(text);
-    EXPECT_EQ(spelling, TypeText(code));
-    EXPECT_EQ(mangled, MangledType(code));
-    EXPECT_EQ(destructor, QualifiedDestructorText(code));
+  for (const auto& [form, text, spellings] : TextCasesOf("translator/spellings.txt")) {
+    const TypeCode code = CodeOf(text, form == "reflected");
+    const std::string others = "\n" + MangledType(code) + "\n" + QualifiedDestructorText(code);
+    EXPECT_EQ(spellings, TypeText(code) + (form == "reflected" ? others : "")) << text;
   }
   MemoryTextWriter out;
   PrintDeclaration(out, CodeOf("K"), "x", DeclarationMode::Reference);
@@ -270,91 +181,24 @@ TEST_F(TypesTest, WhatTypesCanDo) {
 }
 
 TEST_F(TypesTest, FieldTypes) {
-  auto fault = [&](const std::string& text, bool inModel, bool serialisable) {
+  for (const auto& [place, text, message] : TextCasesOf("translator/field_types.txt")) {
     TypeContext context;
     context.isMutable = true;
-    context.inModel = inModel;
-    context.serialisable = serialisable;
-    return std::string(TypeFault(CodeOf(text), Root(), context));
-  };
-  const std::pair<std::string, std::string> inModels[] = {
-      {"const int32", "const or volatile qualifiers not permitted within models"},
-      {"xvector<CK>", "const or volatile qualifiers not permitted within models"},
-      {"assignable<movable<int32>>", "assignable<> and movable<> are incompatible decorators"},
-      {"offsettable<assignable<int32>>", "assignable<> and offsetable<> are incompatible decorators"},
-      {"xvector<assignable<int32>>", "assignable<> not permitted here - data type is immutable"},
-      {"xmap<assignable<int8>,int8>", "assignable<> not permitted here - data type is immutable"},
-      {"movable<offsettable<int32>>", "movable<> and offsetable<> are incompatible decorators"},
-      {"xvector<movable<int8>>", "movable<T> only permitted where T is a pref/cref"},
-      {"xvector<xmap<int8,movable<pref<n::I>>>>", "movable<> not permitted here"},
-      {"offsettable<bool>", "Only integral types are offsetable"},
-      {"xvector<offsettable<int8>>", "offsetable<> not permitted here - data type is immutable"},
-      {"F", "functor not permitted within models"},
-      {"K&", "References not permitted within models"},
-  };
-  for (const auto& [text, message] : inModels) EXPECT_EQ(message, fault(text, true, false)) << text;
-  const std::pair<std::string, std::string> onlyInModels[] = {
-      {"assignable<int32>", "assignable<>"}, {"xmap<int8,assignable<int8>>", "assignable<>"},
-      {"movable<pref<n::I>>", "movable<>"},  {"xvector<movable<cref<K>>>", "movable<>"},
-      {"offsettable<int8>", "offsetable<>"},
-  };
-  for (const auto& [text, decorator] : onlyInModels) {
-    EXPECT_EQ("", fault(text, true, false)) << text;
-    EXPECT_EQ(decorator + " only permitted within models", fault(text, false, false)) << text;
+    context.inModel = place == "in a model";
+    context.serialisable = place == "serialised";
+    EXPECT_EQ(message, TypeFault(CodeOf(text), Root(), context)) << place << ": " << text;
   }
-  for (const std::string text : {"const K*", "ptr<n::I>", "void*", "int8 x[2][]"})
-    EXPECT_EQ("", fault(text, true, false));
-  for (const std::string text : {"const int32", "xvector<CK>", "F", "K&"}) EXPECT_EQ("", fault(text, false, false));
-  const std::pair<std::string, std::string> everywhere[] = {
-      {"pref<K>", "pref<T> requires that T be an interface"},
-      {"ptr<E>", "ptr<T> requires that T be an interface"},
-      {"cref<n::I>", "cref<T> requires that T be a class/struct/model"},
-      {"void", "void not permitted here"},
-      {"xvector<n::I>", "Interface specfifer must appear in pref<> or ptr<>"},
-      {"xdeque<int8>", "deque<T> currently not supported"},
-      {"xlist<int8>", "list<T> currently not supported"},
-      {"xbag<int8>", "bag<T> currently not supported"},
-  };
-  for (const auto& [text, message] : everywhere) {
-    for (bool inModel : {true, false}) EXPECT_EQ(message, fault(text, inModel, false));
-  }
-  const std::pair<std::string, std::string> serialised[] = {
-      {"K", ""},
-      {"const int8", "const or volatile qualifiers not permitted on serialisable types"},
-      {"F", "functor doesn't support serialisation"},
-      {"void*", "Pointers don't support serialisation"},
-      {"K&", "References don't support serialisation"},
-      {"ptr<E>", "ptr<T> doesn't support serialisation"},
-  };
-  for (const auto& [text, message] : serialised) EXPECT_EQ(message, fault(text, false, true));
 }
 
 // --- Byte code: the codes above with each name as an index into the string table of the record.
 
 TEST_F(TypesTest, ByteCode) {
-  const std::string fifteen = "0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,0x35,";
-  const std::array<std::string, 3> cases[] = {
-      // the type, its bytes, and the strings that it adds
-      {"xmap<string8,const int8*[259]>", "0x51,0x10,0x50,0x03,0x01,0x00,0x00,0x35,0x31,0x02", ""},
-      {"xmap<n::S,xvector<E>>", "0x51,0x20,0x00,0x00,0x44,0x23,0x01,0x00", "    \"n::S\",\n    \"E\",\n"},
-      {"n::T*", "0x35,0x22,0x02,0x00", "    \"n::T\",\n"},
-      {"n::S&", "0x36,0x20,0x00,0x00", ""},
-      {"int32 : [7, \"x\\n\", true, 1.0, f(E)]",
-       "0xe5,0xa2,0x07,0x00,0x00,0x00,0xa4,0x03,0x00,0xa1,0x01,0xa3,0x00,0x00,0x00,0x00,\n"
-       "    0x00,0x00,0xf0,0x3f,0xc1,0x04,0x00,0xc0,0x01,0x00,0x04",
-       "    \"x\\n\",\n    \"f\",\n"},
-      {"int32" + std::string(15, '*'), fifteen + "0x04", ""},
-      {"int32" + std::string(16, '*'), fifteen + "0x35,\n    0x04", ""},
-  };
-  StringTable strings;
-  std::string added;
-  MemoryTextWriter out;
-  for (const auto& [text, bytes, names] : cases) {
+  StringTable strings;  // to which each type adds its own
+  for (const auto& [name, text, expected] : TextCasesOf("translator/byte_code.txt")) {
+    MemoryTextWriter out;
     WriteTypeByteCode(out, "A", strings, CodeOf(text));
-    EXPECT_EQ("static const vesk::octet_t A[] =\n{\n    " + bytes + "\n};\n", out.TakeText()) << text;
-    added += names;
     WriteStringTable(out, strings, "N");
-    EXPECT_EQ(added.empty() ? "" : "static vesk::ConstStringZ N_stringTable[] =\n{\n" + added + "};\n", out.TakeText());
+    EXPECT_EQ(expected + "\n", out.TakeText()) << text;
   }
 }
 

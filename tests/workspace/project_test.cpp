@@ -60,10 +60,6 @@ class ProjectTest : public WorldTest {
     }
     return text;
   }
-  void AssertCompilerText(const std::string& statements, const std::string& expected) {
-    EXPECT_EQ(expected, OfConfigs(statements, [](const ProjectConfig& config) { return config.compilerText; }))
-        << statements;
-  }
   void AssertError(const std::string& text, const std::string& message) {
     EXPECT_EQ(nullptr, TryLoad(text)) << text;
     EXPECT_EQ("\ntree/app/src/app.qrpj" + message + "\n", trace) << text;
@@ -116,18 +112,10 @@ TEST_F(ProjectTest, Configurations) {
 }
 
 TEST_F(ProjectTest, ScopesAndRawBlocks) {
-  AssertCompilerText("+cpp { -a   -b=1/**/c\n-d }",
-                     "Debug|x64: -a -b=1 c -d\nRelease|x64: -a -b=1 c -d\nDebug|Win: -a -b=1 c -d\n");
-  AssertCompilerText("+cpp (\"Debug\") { -a } +cpp (\"none\", \"x64\") { -b }",
-                     "Debug|x64: -a -b\nRelease|x64: -b\nDebug|Win: -a\n");
-  AssertCompilerText("+cpp (\"Debug|x64\", \"small\") { -a } +cpp (\"gcc|fast\") { -b } +cpp (\"vc9\") { -c }",
-                     "Debug|x64: -a\nRelease|x64: -a -b\nDebug|Win:\n");
-  AssertCompilerText(
-      "+cpp (\"Console Application|Debug\") { -a } +cpp (\"Application\") { -b } +cpp (\"Debug|\") { -c }",
-      "Debug|x64: -a\nRelease|x64:\nDebug|Win: -a\n");
-  AssertCompilerText("$V = \"v w\" +cpp { \"$(V)/$(CONFIG)\" $(PLATFORM) }",
-                     "Debug|x64: \"v w/Debug\" x64\nRelease|x64: \"v w/Release\" x64\nDebug|Win: \"v w/Debug\" Win\n");
-  AssertCompilerText("+cpp (\"Win\") { }", "Debug|x64:\nRelease|x64:\nDebug|Win: \n");
+  for (const auto& [name, statements, expected] : TextCasesOf("workspace/cases/scopes.txt")) {
+    EXPECT_EQ(expected + "\n", OfConfigs(statements, [](const ProjectConfig& config) { return config.compilerText; }))
+        << statements;
+  }
   EXPECT_EQ("Debug|x64: -a -b\nRelease|x64: -a\nDebug|Win: -a -b\n",
             OfConfigs("+link { -a } -link (\"Debug\") { -b }",
                       [](const ProjectConfig& config) { return config.linkerText; }));
@@ -198,15 +186,7 @@ TEST_F(ProjectTest, OptionsOfConfigurations) {
                       }));
 }
 
-TEST_F(ProjectTest, Names) {
-  AssertTree("{ \"a.h\" 'b.x' as \"B.cpp\" \"src\" { \"c.cpp\" } }", "app/a.h app/b.x=B.cpp src{app/src/c.cpp}");
-  AssertTree("{ \"s\" as \"S\" { \"a\" } \"\" as \"D\" { \"b\" \"\" { \"c\" } } \"S\" { \"d\" } }",
-             "S{app/s/a app/S/d} D{app/b app/c}");
-  AssertTree("{ \"../inc\" { \"a.h\" } \"..\" { \"b\" } \"../x\" as \"X\" { \"../c\" } }",
-             "inc{inc/a.h} ${b} X{c=../c}");
-  AssertTree("{ \"x\" { \"a.h\" } \"y\" { \"../x/a.h\" as \"other\" } }", "x{app/x/a.h} y{}");
-  AssertTree("{ \"a.h\" : exclude \"b.h\" : exclude, exclude (\"none\") \"d/e.h\" }",
-             "-app/a.h -app/b.h app/d/e.h=d/e.h");
+TEST_F(ProjectTest, KindsOfFiles) {
   const Project& project = Load(std::string("$TARGET_TYPE = \"Static Library\" $ROOT_TO_PROJDIR = \"app\"") +
                                 "{ \"app.CPP\" \"p.h\" \"src\" { \"q.H\" \"r.Py\" \".x\" \"noext\" } }");
   std::string kinds;
@@ -221,25 +201,14 @@ TEST_F(ProjectTest, Names) {
       kinds);
 }
 
-TEST_F(ProjectTest, Searches) {
+// Searches, and names that are given to files and folders.
+TEST_F(ProjectTest, Trees) {
   for (const char* path : {"tree/app/a.h", "tree/app/b.cpp", "tree/app/.hid.h", "tree/app/s/c.h", "tree/app/s/t/d.H",
                            "tree/app/u/e.txt", "more/app/f.h", "more/app/s/g.h", "more/app/v/w/h.h"}) {
     Write(path, "");
   }
-  AssertTree("{ \"*.h\" }", "app/a.h app/f.h");
-  AssertTree("{ \"*.h\" * }", "app/a.h app/f.h s{app/s/c.h app/s/g.h t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
-  AssertTree("{ [\"?.h\" \"*.txt\"] flat * }",
-             "app/s/t/d.H app/s/c.h app/s/g.h app/u/e.txt app/a.h app/v/w/h.h app/f.h");
-  AssertTree("{ - [\"*.h\" \"*.qrpj\"] * }", "app/b.cpp u{app/u/e.txt}");
-  AssertTree("{ + \"*.CPP\" - \"*.*\" }", "app/b.cpp");
-  AssertTree("{ directories - [\"s\" \"V\"] \"*.h\" * }", "app/a.h app/f.h");
-  AssertTree("{ directories + \"s\" \"s\" { \"*\" * : exclude } \"*.h\" * }",
-             "app/a.h app/f.h s{-app/s/c.h -app/s/g.h}");
-  AssertTree("directories + \"s\" directories \"t*\" { \"*.h\" * }",
-             "app/a.h app/f.h s{app/s/c.h app/s/g.h t{app/s/t/d.H}}");
-  AssertTree("{ \"s/c.h\" \"s/g.h\" \"*.h\" * }",
-             "app/s/c.h=s/c.h app/s/g.h=s/g.h app/a.h app/f.h s{t{app/s/t/d.H}} v{w{app/v/w/h.h}}");
-  AssertTree("{ \"none\" { \"*\" * } }", "none{}");
+  for (const auto& [name, tree, expected] : TextCasesOf("workspace/cases/project_trees.txt"))
+    AssertTree(tree, expected);
   // Above the roots lies the folder of the run.
   Write("here.h", "");
   AssertError(std::string(kHeads) + "{ \"../..\" { \"*.h\" } }", "(3) : Path leads out of the tree : ..");

@@ -54,23 +54,6 @@ class SwitchesTest : public WorldTest {
     for (const Step& step : steps) Read(step.block, "{ " + step.switches + " }").Apply(options);
     return options;
   }
-
-  std::string Linked(const std::string& text, CompilerKind compiler = CompilerKind::vc14) {
-    return Parsed(text, compiler, ParseLinkerText);
-  }
-  std::string Archived(const std::string& text) { return Parsed(text, CompilerKind::gcc, ParseLibrarianText); }
-
- private:
-  std::string Parsed(const std::string& text, CompilerKind compiler,
-                     void (*parse)(const Project&, const ProjectConfig&, OptionMap&)) {
-    settings.compiler = compiler;
-    Project project(*workspace);
-    ProjectConfig config;
-    config.linkerText = text;
-    OptionMap options;
-    parse(project, config, options);
-    return Text(options);
-  }
 };
 
 TEST_F(SwitchesTest, WhatSwitchesSay) {
@@ -85,25 +68,9 @@ TEST_F(SwitchesTest, WhatSwitchesSay) {
 }
 
 TEST_F(SwitchesTest, ErrorsInCompilerBlocks) {
-  static constexpr struct {
-    Block block;
-    const char* text;
-    const char* message;
-  } kCases[] = {
-      {kAddCpp, "/O2", "Expected '{' when read /"},
-      {kAddCpp, "{ /FR \"x\" }", "Expected '}' when read \"x\""},
-      {kAddCpp, "{ /wd4100 }", "Invalid switch /wd4100"},
-      {kRemoveCpp, "{ /wd 4100 }", "Subtraction of /wd not supported"},
-      {kAddCpp, "{ /arch }", "Invalid switch /arch"},
-      {kAddCpp, "{ /arch:SSE3 }", "Invalid switch /arch:SSE3"},
-      {kAddCpp, "{ /od }", "Invalid switch /od"},
-      {kAddCpp, "{ / }", "Invalid switch / }"},
-      {kAddCpp, "{ /", "Invalid switch /"},
-      {kAddCpp, "{ /Ge }", "Invalid switch /Ge"},
-      {kAddCpp, "{ /Gf }", "/Gf not supported, use /GF instead"},
-      {kAddRc, "{ /w }", "Invalid resource compiler switch /w"},
-  };
-  for (const auto& [block, text, message] : kCases) EXPECT_EQ(message, ErrorOf(block, text)) << text;
+  const std::map<std::string, Block> blocks = {{"+cpp", kAddCpp}, {"-cpp", kRemoveCpp}, {"+rc", kAddRc}};
+  for (const auto& [block, text, message] : TextCasesOf("workspace/cases/switch_errors.txt"))
+    EXPECT_EQ(message, ErrorOf(blocks.at(block), text)) << text;
 }
 
 TEST_F(SwitchesTest, ConfigurationsTakeSwitchesOver) {
@@ -185,60 +152,22 @@ TEST_F(SwitchesTest, LinkerTokens) {
   ASSERT_EQ("Met EOS within switch after reading \"a b", MessageOf([] { LinkerTokens("/OUT:\"a b"); }));
 }
 
-TEST_F(SwitchesTest, LinkerProperties) {
-  ASSERT_EQ(
-      "AdditionalDependencies=\nEnableUAC=2?\nErrorReporting=3?\nGenerateManifest=false\nImageHasSafeExceptionHandlers="
-      "?1\n"
-      "LinkIncremental=1\nLinkTimeCodeGeneration=4\nShowProgress=?6\nSubSystem=1\nSwapRunFromNet=true\nTargetMachine="
-      "17\n"
-      "UACExecutionLevel=3?\nUACUIAccess=true?\n",
-      Linked("/subsystem:console /MACHINE:x64 /INCREMENTAL:NO /Manifest:no /MANIFESTUAC /LEVEL='requireAdministrator' "
-             "/uiaccess='TRUE' /SAFESEH:NO /LTCG:PGUPDATE /VERBOSE:CLR /errorReport:send /SwapRun:Net /DLL "
-             "/pdbtype:sept"));
-  ASSERT_EQ(
-      "AdditionalDependencies=\nAdditionalLibraryDirectories=a;b c\nAdditionalOptions=/out:x.exe /PDB: /ODD:\"1\"\n"
-      "IgnoreAllDefaultLibraries=true\nIgnoreDefaultLibraryNames=libc\nKeyFile=k\nOutputFile=X.exe\n",
-      Linked("/OUT:\"X.exe\" /out:x.exe /LIBPATH:\"a\" /libpath:\"b c\" /PDB: /NODEFAULTLIB /nodefaultlib:\"libc\" "
-             "/ODD:\"1\" /KeyFile:\"k\""));
-  ASSERT_EQ(
-      "AdditionalDependencies=\nGenerateMapFile=true\nHeapReserveSize=0x10\nMapFileName=a.map\nStackCommitSize=4096\n"
-      "StackReserveSize=1048576\n",
-      Linked("/STACK:1048576,4096 /heap:0x10 /MAP:\"a.map\""));
-  ASSERT_EQ("AdditionalDependencies=\nAdditionalOptions=/MAP:a.map /HEAP\n", Linked("/MAP:a.map /HEAP"));
-  ASSERT_EQ("", trace);
-}
-
-TEST_F(SwitchesTest, LibrariesOfALinkerText) {
-  const std::string text = "\"z.lib\" \"USER32.lib\" \"x.lib\" \"z.lib\"";
-  ASSERT_EQ("AdditionalDependencies=x.lib;z.lib;\n", Linked(text, CompilerKind::vc10));
-  ASSERT_EQ("AdditionalDependencies=&quot;x.lib&quot; &quot;z.lib&quot;\n", Linked(text, CompilerKind::vc9));
-  ASSERT_EQ("AdditionalDependencies=\n", Archived(text));
-}
-
-TEST_F(SwitchesTest, LibrariansKnowLess) {
-  ASSERT_EQ(
-      "AdditionalDependencies=\nAdditionalLibraryDirectories=p\nExportNamedFunctions=f;g\nIgnoreAllDefaultLibraries="
-      "true\n"
-      "ModuleDefinitionFile=d\nOutputFile=o\nSuppressStartupBanner=true\n",
-      Archived("/nologo /NODEFAULTLIB /OUT:\"o\" /DEF:\"d\" /EXPORT:\"f\" /export:\"g\" /LIBPATH:\"p\""));
-  ASSERT_EQ("", trace);
-  ASSERT_EQ("AdditionalDependencies=\n", Archived("/SUBSYSTEM:CONSOLE /OUT:o x.lib / /:a"));
-  ASSERT_EQ(
-      "ERROR: Invalid librarian switch : /SUBSYSTEM:CONSOLE\nERROR: Invalid librarian switch : /OUT:o\n"
-      "ERROR: Unexpected librarian argument: x.lib\nERROR: Invalid librarian switch : /\n"
-      "ERROR: Invalid librarian switch : /:a\n",
-      trace);
-}
-
-TEST_F(SwitchesTest, StrangeLinkerArguments) {
-  ASSERT_EQ("AdditionalDependencies=\n", Linked("x.lib / /:a -lm"));
-  ASSERT_EQ(
-      "ERROR: Unexpected linker argument: x.lib\nERROR: Invalid linker switch : /\nERROR: Invalid linker switch : /:a\n"
-      "ERROR: Unexpected linker argument: -lm\n",
-      trace);
-  trace.clear();
-  Linked("x.lib -lm", CompilerKind::clang);
-  ASSERT_EQ("", trace);
+// The properties that linkers and librarians are asked for, and what is told of the rest.
+TEST_F(SwitchesTest, LinkerTexts) {
+  const std::map<std::string, CompilerKind> kinds = {{"vc9", CompilerKind::vc9},
+                                                     {"vc10", CompilerKind::vc10},
+                                                     {"vc14", CompilerKind::vc14},
+                                                     {"clang", CompilerKind::clang},
+                                                     {"librarian", CompilerKind::gcc}};
+  for (const auto& [tool, text, expected] : TextCasesOf("workspace/cases/linker_texts.txt")) {
+    settings.compiler = kinds.at(tool);
+    Project project(*workspace);
+    ProjectConfig config;
+    config.linkerText = text;
+    OptionMap options;
+    (tool == "librarian" ? ParseLibrarianText : ParseLinkerText)(project, config, options);
+    EXPECT_EQ(expected + "\n", Text(options) + TakeTrace()) << text;
+  }
 }
 
 // --- Libraries of subprojects

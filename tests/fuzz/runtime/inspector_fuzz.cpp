@@ -7,10 +7,6 @@
 
 namespace {
 
-void Require(bool holds) {
-  if (!holds) std::abort();
-}
-
 struct Shown {
   Shown() {
     reflected.parts.resize(3);

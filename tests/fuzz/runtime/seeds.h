@@ -9,6 +9,10 @@
 
 void Register_Project_kinds();
 
+inline void Require(bool holds) {
+  if (!holds) std::abort();
+}
+
 // Registers the kinds. With `--seeds FOLDER` it writes the seeds, each behind its number, and ends.
 template <typename Seed>
 int Begin(int count, char** arguments, std::vector<Seed> (*seeds)()) {

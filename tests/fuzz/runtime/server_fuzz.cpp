@@ -22,10 +22,6 @@ struct Input {
   std::uint8_t const* m_end;
 };
 
-void Require(bool holds) {
-  if (!holds) std::abort();
-}
-
 void ServeMessages(Input input, bool asksForToken) {
   const vesk::xstring token = "of sixteen bytes or more";
   kinds::Calc calc;

@@ -307,9 +307,7 @@ $class+ Doc isa vesk::IObject : model {
     xmap<int32,Part> parts;
     Part cells[2][2];
     xvector<Part> list;
-}
-{
-};
+} { };
 $struct Plain : model {
     int32 fixed[3];
     xvector<int32> vector;
@@ -321,9 +319,7 @@ $struct Plain : model {
     xset<int32> set;
     string8 names[2][2];
     xmap<int32,xmap<int32,string8>> deep;
-}
-{
-};
+} { };
 
 }
 

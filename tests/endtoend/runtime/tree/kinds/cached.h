@@ -29,11 +29,7 @@ $mixin CacheMixin {
     $indep int32 source;
     EveryCachedFunction(int32)
 };
-$class+ WithCaches isa shapes::INamed : mixin [ CacheMixin ] {
-public:
-    vesk::string8 Name() const { return "caches"; }
-    $int32 base;
-};
+$class+ WithCaches isa vesk::IObject : mixin [ CacheMixin ] { public: $int32 base; };
 
 $struct CacheTemplate<typename T> {
     $indep T source;

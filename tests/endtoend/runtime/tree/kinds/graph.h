@@ -59,10 +59,7 @@ $mixin NodeMixin {
     $dep void action calc { };
     typename BC::FinalClass const* Final() const { return $this; }
 };
-$class+ WithNodes isa shapes::INamed : mixin [ NodeMixin { $dep int32 more = { more = 4; }; } ] {
-public:
-    vesk::string8 Name() const { return "nodes"; }
-};
+$class+ WithNodes isa vesk::IObject : mixin [ NodeMixin { $dep int32 more = { more = 4; }; } ] { };
 
 $class+ Watched isa vesk::IObject : model { int32 a; Size size; xset<int32> set; }
 {

@@ -88,14 +88,8 @@ public:
     int32 Sum() { return $$::Static() + own; }
     static int32 Static() { return 40; }
 };
-$class+ ListsModel isa shapes::INamed : mixin [ Size ] {
-public:
-    vesk::string8 Name() const { return "model in a list"; }
-};
-$class+ ListsMixin isa shapes::INamed : mixin [ WithModel ] {
-public:
-    vesk::string8 Name() const { return "mixin with a model"; }
-};
+$class+ ListsModel isa vesk::IObject : mixin [ Size ] { };
+$class+ ListsMixin isa vesk::IObject : mixin [ WithModel ] { };
 $struct Post : shapes::Point mixin [ Counter ] Multi { };
 $struct RawAndModel : shapes::Point model { int32 q; } { };
 $class+ Delegates isa shapes::INamed : mixin
@@ -110,14 +104,8 @@ $struct Deferred isa shapes::INamed;
 $struct Deferred isa shapes::INamed {
     vesk::string8 Name() const { return "deferred"; }
 };
-$class+ Final final isa shapes::INamed {
-public:
-    vesk::string8 Name() const { return "final"; }
-};
-$class+ Abstract <<abstract>> isa shapes::INamed {
-public:
-    vesk::string8 Name() const { return "abstract"; }
-};
+$class+ Final final isa vesk::IObject { };
+$class+ Abstract <<abstract>> isa vesk::IObject { };
 $struct Template<typename T> { T t; };
 $struct TemplateObject<typename T> isa shapes::INamed {
     T t;

@@ -88,9 +88,7 @@ $class+ Doc isa IDoc : model {
         }
         total (count) { total = count; }
     }
-}
-{
-};
+} { };
 
 // What the first release wrote for a Doc.
 $struct Doc1 : model { assignable<string8> title; int32 pages; int32 count; } { };
@@ -103,9 +101,7 @@ $struct+ NoOps <<-genop>> isa vesk::IObject : model {
     xmap<int32,int32> map;
     xset<int32> set;
     Size size;
-}
-{
-};
+} { };
 $struct Plain : model { int32 a; float64 b; } { };
 $class+ Sized isa IDoc : model Size {
 public:

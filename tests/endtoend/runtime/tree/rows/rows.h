@@ -55,24 +55,34 @@ Bytes Written(T const&... values) {
     return ar.m_bytes;
 }
 
-inline Bytes Joined(Bytes a, Bytes const& b) {
-    a.insert(a.end(), b.begin(), b.end());
+inline Bytes Joined(Bytes a, Bytes const& b, Bytes const& c = {}, Bytes const& d = {}) {
+    for (Bytes const* more : {&b, &c, &d}) a.insert(a.end(), more->begin(), more->end());
     return a;
+}
+
+// With each `from` as `by`.
+inline vesk::xstring Replaced(vesk::xstring text, vesk::xstring const& from, vesk::xstring const& by) {
+    for (std::size_t at = 0; (at = text.find(from, at)) != text.npos; at += by.size()) text.replace(at, from.size(), by);
+    return text;
+}
+
+template <typename T>
+void Read(Bytes const& bytes, T& to) {
+    vesk::InputArchive input(bytes);
+    input >> to;
+}
+template <typename T>
+T ReadAs(Bytes const& bytes) {
+    T to;
+    Read(bytes, to);
+    return to;
 }
 
 // Through an archive.
 template <typename T>
-void Copy(T const& from, T& to) {
-    vesk::InputArchive input(Written(from));
-    input >> to;
-}
-
+void Copy(T const& from, T& to) { Read(Written(from), to); }
 template <typename T>
-T Copied(T const& from) {
-    T to;
-    Copy(from, to);
-    return to;
-}
+T Copied(T const& from) { return ReadAs<T>(Written(from)); }
 
 // What comes out of an archive of a value that `set` has filled.
 template <typename T, typename Set>
@@ -81,3 +91,26 @@ T Through(Set set) {
     set(value);
     return Copied(value);
 }
+
+// A client and a server in one thread; what the server was told of goes to `errors`.
+struct Wire {
+    Wire() : server(channel.Server()), client(channel.Client(), [this] { server.Serve(); }) {
+        server.OnError([this](std::string const& text) { errors.push_back(text); });
+    }
+    vesk::LocalChannel channel;
+    vesk::Server server;
+    vesk::ClientConnection client;
+    vesk::xvector<vesk::xstring> errors;
+};
+
+// An object of a server, as a client has it.
+template <typename I>
+struct Far {
+    Far(vesk::ClientConnection& client, vesk::uint32 number) : number(number), stub(vesk::Import<I>(client, number)), object(stub->Interface()) {}
+    template <typename Object>
+    Far(Wire& wire, Object& object) : Far(wire.client, wire.server.Export(vesk::ptr<I>(&object))) {}
+    vesk::ptr<I> const& operator->() const { return object; }
+    const vesk::uint32 number;
+    const std::unique_ptr<vesk::Stub> stub;
+    const vesk::ptr<I> object;
+};

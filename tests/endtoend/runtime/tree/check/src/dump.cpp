@@ -104,11 +104,8 @@ ROW(DumpedObjects) {
     around.size = &size;
     around.value = Value(Value::point{1, 2});
     around.any = vesk::openvariant<int32>(size);
-    const vesk::xstring sizeText = "width=7 PATHheight=7 PATHcolour=Red PATHlevel=Mid ";
-    const auto at = [&](vesk::xstring const& path) {
-        std::string text = path + sizeText;
-        for (std::size_t i; (i = text.find("PATH")) != text.npos;) text.replace(i, 4, path);
-        return vesk::xstring(text);
+    const auto at = [](vesk::xstring const& path) {
+        return Replaced("PATHwidth=7 PATHheight=7 PATHcolour=Red PATHlevel=Mid ", "PATH", path);
     };
     // The contents of objects follow the first reference, or the one that leads to all.
     const vesk::xstring itselfText = "=13 bytes that only the class knows ";

@@ -41,10 +41,7 @@ struct OfTwo {
 
 ROW(HostileReferences) {
     Words words;
-    vesk::Archive ar;
-    ar << vesk::cref<Words>(&words);
-    vesk::SerialiseVariableLengthUint(ar, 1);
-    vesk::InputArchive input(ar);
+    vesk::InputArchive input(Joined(Written(vesk::cref<Words>(&words)), {1}));
     OfTwo two;
     CHECK(Throws([&] { input >> two; }) && two.second.Get() == nullptr, true);
     delete two.first.Get();
@@ -69,10 +66,7 @@ ROW(HostileReferences) {
 
     // The other way round: a value behind a cref is no object.
     Size size(3);
-    vesk::Archive values;
-    values << vesk::cref<Size>(&size);
-    vesk::SerialiseVariableLengthUint(values, 1);
-    vesk::InputArchive fromValue(values);
+    vesk::InputArchive fromValue(Joined(Written(vesk::cref<Size>(&size)), {1}));
     vesk::cref<Size> held;
     vesk::pref<IDoc> object;
     CHECK(Throws([&] { fromValue >> held >> object; }), true);

@@ -9,10 +9,7 @@ using namespace kinds;
 namespace {
 
 // Quotes as apostrophes, for text that is full of them.
-vesk::xstring Q(vesk::xstring text) {
-    std::replace(text.begin(), text.end(), '\'', '"');
-    return text;
-}
+vesk::xstring Q(vesk::xstring const& text) { return Replaced(text, "'", "\""); }
 
 template <typename T>
 vesk::xstring Json(T const& value) {
@@ -44,7 +41,7 @@ const Part g_part = MakePart(7, "p"), g_other = MakePart(8, "a much longer name 
 
 // A value of each kind.
 vesk::xstring ReflectedText() {
-    vesk::xstring text =
+    const vesk::xstring text =
         Q("{'flag':true,'i8':-128,'i16':0,'i64':'-9223372036854775808',"
           "'i128':'-170141183460469231731687303715884105728','u64':'18446744073709551615',"
           "'u128':'340282366920938463463374607431768211455','f32':0.1,'f64':-1e+300,'c8':'a','c16':'b',"
@@ -55,12 +52,8 @@ vesk::xstring ReflectedText() {
           "'deep':{'-4':[{'a':1.5},{}]},'byColour':{'Green':3},'wideMap':{'2':{'big':'9','small':0}},"
           "'byPart':[[OTHER,1]],'byFloat':[[0.5,'half']],'trees':[{'leaf':1},{'void':null},{'leaf':3}],"
           "'any':{'$type':'string8','$value':'any'},'objects':{},'shared':null,'typedefd':[6],'fixed':[0,9,0]}");
-    auto replace = [&text](std::string const& name, std::string const& by) {
-        for (std::size_t at; (at = text.find(name)) != std::string::npos;) text.replace(at, name.size(), by);
-    };
-    replace("PART", Q("{'number':7,'name':'p','marks':[1,-2]}"));
-    replace("OTHER", Q("{'number':8,'name':'a much longer name than fits','marks':[1,-2]}"));
-    return text;
+    return Replaced(Replaced(text, "PART", Q("{'number':7,'name':'p','marks':[1,-2]}")),
+                    "OTHER", Q("{'number':8,'name':'a much longer name than fits','marks':[1,-2]}"));
 }
 
 }

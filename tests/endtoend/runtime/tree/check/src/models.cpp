@@ -33,9 +33,7 @@ ROW(Archives) {
     all.grid[1][2].height = 6;
     Size shared(4);
     all.reference = &shared;
-    Everything read;
-    vesk::InputArchive input(Written(all));
-    input >> read;
+    Everything read = Copied(all);
     CHECK(read.reference->width, 4);
     delete read.reference.Get();
     read.reference = &shared;
@@ -59,7 +57,7 @@ ROW(Schemas) {
     input >> doc;
     CHECK(vxMakeString(doc.title << doc.count << doc.lines << doc.total << input.Remaining()), "T9[0,0]90");
     bytes[0] = 4;
-    CHECK(Throws([&] { vesk::InputArchive later(bytes); later >> doc; }), true);
+    CHECK(Throws([&] { Read(bytes, doc); }), true);
 
     // Objects that refer to each other.
     Doc next;
@@ -168,9 +166,7 @@ vesk::xstring SizeText(vesk::InputArchive& input, Read read) {
 struct ReadsAnother {
     void Deserialise(vesk::InputArchive& ar) {
         ar >> first;
-        vesk::Archive written;
-        written << Doc();
-        vesk::InputArchive another(written);
+        vesk::InputArchive another(Written(Doc()));
         Doc doc;
         another >> doc;
         ar >> second;
@@ -209,20 +205,17 @@ ROW(Releases) {
     ReadOldScalars();
     CHECK(SizeText(waiting, call), "Size(20,7,Red,Mid) 0");
 
-    vesk::InputArchive outer(Joined(g_oldDoc, Joined(g_oldSize, g_oldSize)));
+    vesk::InputArchive outer(Joined(g_oldDoc, g_oldSize, g_oldSize));
     ReadsAnother both;
     outer >> doc >> both;
     CHECK(vxMakeString(both.first << both.second << outer.Remaining()), "Size(20,7,Green,High)Size(20,7,Green,High)0");
 
     Calc calc;
-    vesk::LocalChannel channel;
-    vesk::Server server(channel.Server());
-    vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
-    const auto stub = vesk::Import<ICalc>(client, server.Export(vesk::ptr<ICalc>(&calc)));
+    Wire wire;
     vesk::InputArchive again(g_oldDoc);
     doc.Deserialise(again);
     Size size(100);
-    vesk::ptr<ICalc>(stub->Interface())->Take(&size);
-    server.Serve();
+    Far<ICalc>(wire, calc)->Take(&size);
+    wire.server.Serve();
     CHECK(calc.notified, 100);
 }

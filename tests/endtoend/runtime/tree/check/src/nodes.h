@@ -65,9 +65,7 @@ $struct Chained {
     mutable int32 calculated = 0;
 };
 
-$struct+ Field <<-genop>> isa vesk::IObject : model { int32 a; int32 cells[]; xmap<int32,int32> map; kinds::Size size; }
-{
-};
+$struct+ Field <<-genop>> isa vesk::IObject : model { int32 a; int32 cells[]; xmap<int32,int32> map; kinds::Size size; } { };
 $struct Plain : model { int32 a; int32 cells[]; xmap<int32,xmap<int32,int32>> maps; } { };
 $struct Around : model { Plain inner; int32 other; } { };
 $struct+ Operated isa vesk::IObject : model { xmap<int32,int32> map; xmap<string8,int32> words; kinds::Size size; } { };

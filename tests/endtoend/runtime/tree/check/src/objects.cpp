@@ -107,16 +107,15 @@ ROW(ReadClasses) {
         void Serialise(vesk::Archive& ar) const { kinds::Size::Serialise(ar); }
         void Deserialise(vesk::InputArchive& ar) { kinds::Size::Deserialise(ar); }
     } outer;
-    vesk::Archive ar;
-    ar << vesk::cref<Outer>(&outer) << vesk::cref<kinds::Size>(&outer) << vesk::cref<kinds::Size>(&outer);
-    vesk::InputArchive back(ar);
+    const Bytes three = Written(vesk::cref<Outer>(&outer), vesk::cref<kinds::Size>(&outer), vesk::cref<kinds::Size>(&outer));
+    vesk::InputArchive back(three);
     vesk::cref<Outer> a;
     vesk::cref<kinds::Size> b, c;
     back >> a >> b >> c;
     CHECK(b == c && a.Object() != b.Object(), true);
     delete a.Get();
     delete b.Get();
-    vesk::InputArchive other(ar);
+    vesk::InputArchive other(three);
     other >> a >> b;
     CHECK(Throws([&] {
         vesk::cref<Outer> third;

@@ -156,12 +156,8 @@ namespace {
 
 // An archive of WriteObject in the given releases of the two projects.
 Bytes HolderBytes(int kindsRelease, Bytes const& size) {
-    Bytes bytes = {0xFF, 'v', 'x', 2, 2, 5, 'c', 'h', 'e', 'c', 'k', 1, 5, 'k', 'i', 'n', 'd', 's'};
-    bytes.push_back(vesk::octet_t(kindsRelease));
-    for (Bytes const& part : {Bytes{0, 2, 6, 'H', 'o', 'l', 'd', 'e', 'r', 1}, size, Bytes{8, 0, 0, 0}}) {
-        bytes.insert(bytes.end(), part.begin(), part.end());
-    }
-    return bytes;
+    const Bytes projects = {0xFF, 'v', 'x', 2, 2, 5, 'c', 'h', 'e', 'c', 'k', 1, 5, 'k', 'i', 'n', 'd', 's', vesk::octet_t(kindsRelease)};
+    return Joined(projects, Bytes{0, 2, 6, 'H', 'o', 'l', 'd', 'e', 'r', 1}, size, Bytes{8, 0, 0, 0});
 }
 
 vesk::xstring ReadHolder(Bytes const& bytes) {
@@ -234,11 +230,10 @@ ROW(Projects) {
     kinds.m_rsn = 2;
     const vesk::xstring low = "vxDefineTarget(kinds, 2): the $schema of kinds::";
     Doc doc;
-    vesk::Archive ar;
-    CHECK(ErrorOf([&] { ar << doc; }).substr(0, low.size()), low);
+    CHECK(ErrorOf([&] { Written(doc); }).substr(0, low.size()), low);
     CHECK(ErrorOf([&] { vesk::WriteObject(vesk::ptr<IDoc>(&holder)); }).substr(0, low.size()), low);
     kinds.m_rsn = 3;
-    CHECK(ErrorOf([&] { ar << doc; }), "none");
+    CHECK(ErrorOf([&] { Written(doc); }), "none");
 }
 
 // The last of all: this project is not registered any more behind it.
@@ -255,7 +250,6 @@ void CheckForgotten() {
     const vesk::xstring text = "{\"$objects\":[{\"$class\":\"Holder\"}],\"$value\":{\"$ref\":1}}";
     CHECK(ErrorOf([&] { vesk::ObjectFromJson<IDoc>(text); }), "line 1, column 14: " + error);
     CHECK(ReadHolder(HolderBytes(3, {20, 0, 0, 0, 7, 0, 0, 0, 0, 1})), error);
-    vesk::Archive ar;
-    CHECK(ErrorOf([&] { ar << vesk::openvariant<int32>(holder); }),
+    CHECK(ErrorOf([&] { Written(vesk::openvariant<int32>(holder)); }),
           "type of an openvariant is not registered (call Register_Project_check() first)");
 }

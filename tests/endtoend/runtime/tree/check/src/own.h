@@ -12,18 +12,12 @@ $class+ Owns isa kinds::IDoc : model {
     xset<string8> names;
     xmap<string8,assignable<string8>> map;
     assignable<xvector<string8>> all;
-}
-{
-};
+} { };
 $struct OwnsPlain : model {
     xvector<string8> words; string8 text; xset<string8> names; xmap<string8,assignable<string8>> map;
-}
-{
-};
+} { };
 
 // Of this project, whose release is 1; a Size is of `kinds`, whose release is 3.
-$class+ Holder isa kinds::IDoc : model { kinds::Size size; int32 behind; }
-{
-};
+$class+ Holder isa kinds::IDoc : model { kinds::Size size; int32 behind; } { };
 $class+ Refers isa kinds::IDoc : model kinds::Size {
 };

@@ -6,12 +6,8 @@ using namespace kinds;
 
 ROW(Remote) {
     Calc calc;
-    vesk::LocalChannel channel;
-    vesk::Server server(channel.Server());
-    const vesk::uint32 number = server.Export(vesk::ptr<ICalc>(&calc));
-    vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
-    const auto stub = vesk::Import<ICalc>(client, number);
-    const vesk::ptr<ICalc> far(stub->Interface());
+    Wire wire;
+    const Far<ICalc> far(wire, calc);
     int32 sum = 0;
     far->Add(3, "four", sum);
     CHECK(sum, 7);
@@ -26,23 +22,11 @@ ROW(Remote) {
     far->Take(&size);
     vesk::xvector<int32> in = {5}, out;
     far->Vectors(in, out);
-    CHECK(vxMakeString(calc.notified << out << bool(vesk::QueryInterface<ICalc>(far))), "104[5,1]true");
-    const auto lost = vesk::Import<ICalc>(client, 9);
-    CHECK(Throws([&] { vesk::ptr<ICalc>(lost->Interface())->Add(1, "", sum); }), true);
+    CHECK(vxMakeString(calc.notified << out << bool(vesk::QueryInterface<ICalc>(far.object))), "104[5,1]true");
+    CHECK(Throws([&] { Far<ICalc>(wire.client, 9)->Add(1, "", sum); }), true);
 }
 
 namespace {
-
-// A client and a server in one thread; what the server was told of goes to `errors`.
-struct Wire {
-    Wire() : server(channel.Server()), client(channel.Client(), [this] { server.Serve(); }) {
-        server.OnError([this](std::string const& text) { errors.push_back(text); });
-    }
-    vesk::LocalChannel channel;
-    vesk::Server server;
-    vesk::ClientConnection client;
-    vesk::xvector<vesk::xstring> errors;
-};
 
 // A message as a stub sends it.
 template <typename... Values>
@@ -65,9 +49,7 @@ ROW(RemoteErrors) {
         if (a == "standard") throw std::logic_error("not today");
         if (a == "other") throw 7;
     };
-    const vesk::uint32 number = wire.server.Export(vesk::ptr<ICalc>(&calc));
-    const auto stub = vesk::Import<ICalc>(wire.client, number);
-    const vesk::ptr<ICalc> far(stub->Interface());
+    const Far<ICalc> far(wire, calc);
     int32 n = 1;
     auto swap = [&](vesk::string8 text) { return CallError([&] { far->Swap(text, n); }); };
 
@@ -80,19 +62,17 @@ ROW(RemoteErrors) {
     CHECK(CallError([&] { vesk::FactoryOf<vesk::ISkeletonFactory>("nobody"); }),
           "no remote interface of this name: nobody");
     const vesk::uint32 second = wire.server.Export(vesk::ptr<ICalc>(&calc));
-    CHECK(second, number + 1);
+    CHECK(second, far.number + 1);
     CHECK(wire.server.Unexport(second) && !wire.server.Unexport(second), true);
-    const auto lost = vesk::Import<ICalc>(wire.client, second);
     vesk::string8 text = "a";
-    CHECK(CallError([&] { vesk::ptr<ICalc>(lost->Interface())->Swap(text, n); }), "no such remote object");
+    CHECK(CallError([&] { Far<ICalc>(wire.client, second)->Swap(text, n); }), "no such remote object");
 
     // A method that takes its own object back.
-    const vesk::uint32 third = wire.server.Export(vesk::ptr<ICalc>(&calc));
-    calc.onSwap = [&](vesk::string8&) { wire.server.Unexport(third); };
-    const auto leaving = vesk::Import<ICalc>(wire.client, third);
-    vesk::ptr<ICalc>(leaving->Interface())->Swap(text, n);
+    const Far<ICalc> leaving(wire, calc);
+    calc.onSwap = [&](vesk::string8&) { wire.server.Unexport(leaving.number); };
+    leaving->Swap(text, n);
     CHECK(text, "a!");
-    CHECK(wire.server.Unexport(third), false);
+    CHECK(wire.server.Unexport(leaving.number), false);
 
     // A method that calls through its own stub.
     calc.onSwap = [&](vesk::string8& a) {
@@ -109,7 +89,8 @@ ROW(RemoteErrors) {
 ROW(RemoteMessages) {
     Calc calc;
     Wire wire;
-    const vesk::uint32 number = wire.server.Export(vesk::ptr<ICalc>(&calc));
+    const Far<ICalc> far(wire, calc);
+    const vesk::uint32 number = far.number;
     auto send = [&](Bytes const& message) {
         wire.errors.clear();
         wire.channel.Client().Send(message);
@@ -133,8 +114,6 @@ ROW(RemoteMessages) {
     // Too large, either way.
     wire.server.SetMessageLimit(100);
     CHECK(send(Message(number, 0, 0, int32(1), vesk::string8(200, 'x'))), "[message of 209 bytes, the limit is 100]0");
-    const auto stub = vesk::Import<ICalc>(wire.client, number);
-    const vesk::ptr<ICalc> far(stub->Interface());
     vesk::xvector<int32> in(24, 1), out;
     CHECK(CallError([&] { far->Vectors(in, out); }), "message of 103 bytes, the limit is 100");
     // An error's text is cut to the limit, between characters.
@@ -172,8 +151,7 @@ ROW(RemoteAnswers) {
     vesk::ClientConnection client(channel.Client(), [&] {
         if (!reply.empty()) channel.Server().Send(reply);
     });
-    const auto stub = vesk::Import<ICalc>(client, 1);
-    const vesk::ptr<ICalc> far(stub->Interface());
+    const Far<ICalc> far(client, 1);
     vesk::uint8 answer = 0;
     int32 kept = 0;
     auto add = [&](Bytes const& behind) {
@@ -206,9 +184,7 @@ ROW(RemoteAnswers) {
 ROW(RemotePersistable) {
     Kept kept;
     Wire wire;
-    const vesk::uint32 number = wire.server.Export(vesk::ptr<IKept>(&kept));
-    const auto stub = vesk::Import<IKept>(wire.client, number);
-    const vesk::ptr<IKept> far(stub->Interface());
+    const Far<IKept> far(wire, kept);
     far->Put(5);
     int32 n = 0;
     far->Take(1, n);
@@ -216,5 +192,5 @@ ROW(RemotePersistable) {
 
     // The stub itself holds nothing to be archived.
     vesk::Archive ar;
-    CHECK(Throws([&] { far->Serialise(ar); }) && Throws([&] { vesk::WriteObject(far); }), true);
+    CHECK(Throws([&] { far->Serialise(ar); }) && Throws([&] { vesk::WriteObject(far.object); }), true);
 }

@@ -56,9 +56,7 @@ ROW(nested_models) {
     CHECK(Through<InTemplate<int>::Inner>([](auto& i) { i.a = 4; }), "Inner(4)");
 
     // One that was archived by the first release of the project.
-    vesk::InputArchive input(vesk::xvector<vesk::octet_t>{1, 5, 0, 0, 0});
-    Outer::Old old;
-    input >> old;
+    const auto old = ReadAs<Outer::Old>({1, 5, 0, 0, 0});
     CHECK(vxMakeString(old.a << old.b << (Copied(old) == old)), "57true");
 
     // Its record is there, though nothing registers it.
@@ -115,13 +113,9 @@ ROW(templates) {
     CHECK(concrete.added + concrete.plain, 7);
 
     // A class writes the release of its project ahead of its model.
-    vesk::Archive ar;
-    ar << box;
-    CHECK(ar.m_bytes.size(), 1 + 4 + 2);
+    CHECK(Written(box).size(), 1 + 4 + 2);
 
-    vesk::InputArchive input(vesk::xvector<vesk::octet_t>{1, 5, 0, 0, 0});
-    Old<int> old;
-    input >> old;
+    const auto old = ReadAs<Old<int>>({1, 5, 0, 0, 0});
     CHECK(vxMakeString(old.a << old.b), "56");
 
     Kept<vesk::int32> kept;
@@ -197,13 +191,8 @@ namespace ipc {
 
 ROW(ipc) {
     Counter counter;
-    vesk::LocalChannel channel;
-    vesk::Server server(channel.Server());
-    std::string errors;
-    server.OnError([&](std::string const& error) { errors += error + '\n'; });
-    vesk::ClientConnection client(channel.Client(), [&] { server.Serve(); });
-    const auto stub = vesk::Import<ICounter>(client, server.Export(vesk::ptr<ICounter>(&counter)));
-    const vesk::ptr<ICounter> far(stub->Interface());
+    Wire wire;
+    const Far<ICounter> far(wire, counter);
     far->Add(4);
     vesk::int32 n = 0;
     far->Get(3, n);
@@ -211,12 +200,11 @@ ROW(ipc) {
     far->Name("b", full);
     CHECK(vxMakeString(n << full), "12ab");
     CHECK(Throws([&] { far->Get(-1, n); }), true);
-    typedef vesk::xvector<vesk::octet_t> Bytes;
     for (Bytes const& message : {Bytes{1, 0, 0, 5, 0}, Bytes{1, 0, 0, 5, 0, 0, 0, 9}, Bytes{1, 7, 0}}) {
-        channel.Client().Send(message);
-        server.Serve();
+        wire.channel.Client().Send(message);
+        wire.server.Serve();
     }
-    CHECK(errors, "times\nread beyond the end of an archive\nbytes behind the arguments\nno such remote method\n");
+    CHECK(wire.errors, "[times,read beyond the end of an archive,bytes behind the arguments,no such remote method]");
     CHECK(counter.total, 9);
 }
 
@@ -373,9 +361,8 @@ ROW(exceptions) {
     const vesk::string8 before(100, 'b');
     for (Held const& other : {Held(Held::inPlace(100)), Held(Held::onHeap(100))}) {
         Held held = before;
-        vesk::Archive ar;
-        ar << other;
-        vesk::InputArchive reads(ar), makes(ar);
+        const Bytes bytes = Written(other);
+        vesk::InputArchive reads(bytes), makes(bytes);
         CHECK(Throws([&] { reads >> held; }), true);
         Fragile::s_fails = true;
         CHECK(Throws([&] { held = other; }), true);
@@ -402,9 +389,7 @@ ROW(exceptions) {
     CHECK(vesk::GetReflectedFunctor<Callback>().m_name, "exceptions::Callback");
 
     // Dropped fields that the archive is too old for.
-    vesk::InputArchive first(vesk::xvector<vesk::octet_t>{1, 5, 0, 0, 0});
-    Keeper keeper;
-    first >> keeper;
+    const auto keeper = ReadAs<Keeper>({1, 5, 0, 0, 0});
     CHECK(vxMakeString(keeper.first << keeper.third), "50");
 }
 

@@ -55,11 +55,16 @@ int CallSum(int rounds) {
     return total;
 }
 
+vesk::xvector<Chained> Chain(std::size_t length) {
+    vesk::xvector<Chained> chain(length);
+    for (std::size_t i = 1; i < length; ++i) chain[i].previous = &chain[i - 1];
+    for (Chained& link : chain) link.x = 1;
+    return chain;
+}
+
 // What the end of a chain says which needs more stacks than one; the error at its beginning comes to the end.
 int Deep() {
-    vesk::xvector<Chained> chain(5000);
-    for (std::size_t i = 1; i < chain.size(); ++i) chain[i].previous = &chain[i - 1];
-    for (Chained& link : chain) link.x = 1;
+    vesk::xvector<Chained> chain = Chain(5000);
     const int length = chain.back().depth;
     chain[0].x = -1;
     for (Chained& link : chain) link.depth.TryEvict(true);
@@ -76,11 +81,7 @@ int Work(int rounds) {
     int result = 0;
     int changes = 0;
     vesk::ModelHook hook([&changes](vesk::ModelChange const&) { ++changes; });
-    vesk::xvector<Chained> chain(1000);
-    for (std::size_t i = 0; i < chain.size(); ++i) {
-        chain[i].x = 1;
-        if (i > 0) chain[i].previous = &chain[i - 1];
-    }
+    vesk::xvector<Chained> chain = Chain(1000);
     Part part, other;
     part.next = &other;
     Plain plain;
