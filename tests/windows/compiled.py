@@ -91,8 +91,8 @@ def runtime_program(name, output, keys):
     with workspace:
         sources = [path.relative_to(workspace.folder) for path in sorted(workspace.path(root).rglob("*.cpp")) if "vxObject" not in path.parts]
         link(workspace, " ".join([*COMPILER, "-Dshapes_API=", with_boost(workspace.folder)]), sources, "program.exe", " ".join(LIBRARIES))
-        got = text_of(run([WINE, "program.exe"], cwd=workspace.folder))
-        assert re.search(output, got), f"not {output}:\n{got[-3000:]}"
+        done = run([WINE, "program.exe"], cwd=workspace.folder)
+        assert re.search(output, text_of(done)), f"status {done.returncode}, not {output}:\n{text_of(done)[-3000:]}"
 
 
 # The programs of the tests of the runtime: what they are to print, and the keys that they are translated with.
