@@ -19,6 +19,13 @@ class Count:
             self.failed.append(label)
             print(f"FAILED {label}\n{failure}", flush=True)
 
+    def take_or_try_again(self, label, failure, again):
+        """Once more, as Wine may fail to start a program, and what asks for times may fail beside others. It is told."""
+        if failure is not None:
+            print(f"{label} failed and is tried again:\n{failure}", flush=True)
+            failure = again()
+        self.take(label, failure)
+
     def skip(self, label, reason):
         self.skipped.append(label)
         print(f"skipped {label}: {reason}", flush=True)

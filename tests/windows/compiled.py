@@ -105,14 +105,17 @@ RUNTIME = {
 }
 
 
+def failure_of(test):
+    try:
+        test()
+    except (AssertionError, subprocess.TimeoutExpired) as failure:
+        return str(failure)[-3000:]
+
+
 def counted(name, tests):
     count = Count(name)
     for label, test in tests:
-        try:
-            test()
-            count.take(label, None)
-        except (AssertionError, subprocess.TimeoutExpired) as failure:
-            count.take(label, str(failure)[-3000:])
+        count.take_or_try_again(label, failure_of(test), lambda test=test: failure_of(test))
     return count
 
 

@@ -191,9 +191,8 @@ def side_by_side(count, play, labels):
                 count.take(label, None)
             else:
                 failures[label] = failure
-    for label, failure in failures.items():  # alone: what asks for times may fail beside others
-        print(f"{label} is tried again, as it failed:\n{failure}", flush=True)
-        count.take(label, play(label)[1])
+    for label, failure in failures.items():  # when nothing else runs
+        count.take_or_try_again(label, failure, lambda label=label: play(label)[1])
     return count
 
 
