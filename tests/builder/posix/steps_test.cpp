@@ -1,5 +1,7 @@
 // Commands of tools as they are told of, and the steps of a build as a scheduler carries them out.
 
+#include <csignal>
+
 #include "builder/scheduler.h"
 #include "message_of.h"
 #include "world_fixture.h"
@@ -103,6 +105,7 @@ TEST_F(StepsTest, StepsAreFinishedInTheirOrder) {
 }
 
 TEST_F(StepsTest, AnInterruptEndsAllSteps) {
+  std::signal(SIGINT, SIG_DFL);  // what a shell runs in the background ignores it
   WriteProgram("tools/writes", "echo half > \"$1\"; sleep 30\n");
   WriteProgram("tools/stopped", "while [ ! -e y ]; do sleep 0.01; done; kill -INT $$\n");
   std::string notes;
