@@ -172,7 +172,7 @@ def tests_of(script):
 
 
 def side_by_side(count, play, labels):
-    """One more at once than there are processors, as many wait; what cannot pass is not tried, what lacks something here says so."""
+    """As many at once as there are processors; what cannot pass is not tried, what lacks something here says so."""
     def play_unless_known(label):
         reason = KNOWN.get(label) or KNOWN.get(label.partition(".")[0])
         if reason:
@@ -183,7 +183,7 @@ def side_by_side(count, play, labels):
             print(f"{label} took {time.monotonic() - begin:.0f} s", flush=True)
         return label, *told
     failures = {}
-    with ThreadPoolExecutor((os.cpu_count() or 1) + 1) as pool:
+    with ThreadPoolExecutor(os.cpu_count()) as pool:
         for label, reason, failure in pool.map(play_unless_known, labels):
             if reason:
                 count.skip(label, reason)
@@ -230,12 +230,13 @@ def main():
     build, binary = Path(sys.argv[1]).resolve(), os.path.abspath(sys.argv[2])
     os.environ.update(QREX_EXE=str(build / "Qrex.exe"), WINEDEBUG="-all")
     folder = sys.argv[3] if len(sys.argv) > 3 else ""
-    with Bridges(build, Path(binary).parent) as bridges, ThreadPoolExecutor(2) as pool:
-        counts = list(pool.map(timed, [lambda: units(build), lambda: programs(build), lambda: bytes_of_both(binary), compiled.examples,
-                                       compiled.runtime, lambda: builds(build)]))
-        counts.append(timed(lambda: scripts(bridges.program)))  # at several at once by themselves
-        if folder:
-            counts.append(timed(lambda: cases(Path(folder).resolve())))
+    groups = [lambda: programs(build), lambda: units(build), lambda: bytes_of_both(binary), compiled.examples, compiled.runtime,
+              lambda: builds(build)]
+    if folder:
+        groups.append(lambda: cases(Path(folder).resolve()))
+    with Bridges(build, Path(binary).parent) as bridges, ThreadPoolExecutor(1) as pool:
+        longest = pool.submit(timed, lambda: scripts(bridges.program))  # takes as long as all others together
+        counts = [*map(timed, groups), longest.result()]
     met = {name for count in counts for label in count.skipped for name in (label, label.partition(".")[0])}
     gone = [label for label in KNOWN if label not in met and (folder or "/" not in label)]
     print("".join(f"FAILED skipped.txt: there is no {label}\n" for label in gone), end="")
