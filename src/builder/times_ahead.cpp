@@ -74,8 +74,17 @@ void TimesAhead::Read(Chunk& chunk, Folders& folders) {
   } catch (...) {
     entry.isKnown = false;  // who asks the system anew is told why
   }
-  chunk.isRead = true;
-  chunk.isRead.notify_all();
+  {
+    const std::lock_guard lock(m_mutex);
+    chunk.isRead = true;
+  }
+  m_chunkIsRead.notify_one();  // there is one who asks
+}
+
+void TimesAhead::WaitFor(const Chunk& chunk) {
+  if (chunk.isRead) return;
+  std::unique_lock lock(m_mutex);
+  m_chunkIsRead.wait(lock, [&] { return chunk.isRead.load(); });
 }
 
 std::vector<TimesAhead::Stamps>* TimesAhead::Of(const Project& project) {
@@ -88,7 +97,7 @@ std::vector<TimesAhead::Stamps>* TimesAhead::Of(const Project& project) {
   if (known == m_entryOf.end()) return nullptr;
   Entry& entry = *known->second;
   ReadOn(entry.lastChunk);
-  for (size_t i = entry.lastChunk; i-- > 0 && m_chunks[i].entry == &entry;) m_chunks[i].isRead.wait(false);
+  for (size_t i = entry.lastChunk; i-- > 0 && m_chunks[i].entry == &entry;) WaitFor(m_chunks[i]);
   return entry.isKnown ? &entry.stamps : nullptr;
 }
 

@@ -7,8 +7,10 @@
 #pragma once
 
 #include <atomic>
+#include <condition_variable>
 #include <deque>
 #include <memory>
+#include <mutex>
 #include <string>
 #include <thread>
 #include <unordered_map>
@@ -62,7 +64,8 @@ class TimesAhead {
   };
 
   void ReadOn(size_t last);  // chunks that nobody has begun, up to that one
-  static void Read(Chunk& chunk, Folders& folders);
+  void Read(Chunk& chunk, Folders& folders);
+  void WaitFor(const Chunk& chunk);
 
   const LeftoverSweep& m_announced;
   const size_t m_writesBefore;
@@ -71,6 +74,9 @@ class TimesAhead {
   std::deque<Chunk> m_chunks;
   std::atomic<size_t> m_next{0};  // chunk that nobody has begun
   std::atomic<bool> m_isOver{true};
+  // Not isRead.wait(): where the system itself has no such wait, that may miss what is told meanwhile.
+  std::mutex m_mutex;
+  std::condition_variable m_chunkIsRead;
   std::vector<std::thread> m_threads;
 };
 
