@@ -74,7 +74,7 @@ constexpr Compiler VisualStudio(Compiler row) {
 
 constexpr Compiler GccLike(Compiler row) {
   row.family = CompilerFamily::Gcc;
-  row.formats = formats::kGcc;
+  if (row.formats.empty()) row.formats = formats::kGcc;
   SetIfEmpty(row.compile, "gcc-4 -c");
   SetIfEmpty(row.archive, "ar rcs");
   row.keepsRawSwitches = true;
