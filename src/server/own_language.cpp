@@ -34,9 +34,10 @@ int SymbolKindOf(const NameSpaceElement& element) {
       return 23;
     case Category::Typedef:
       return 26;
-    default:
-      return element.GetKeyword() == "struct" ? 23 : 5;
+    case Category::Class:
+      break;
   }
+  return element.GetKeyword() == "struct" ? 23 : 5;
 }
 
 std::string_view LineAt(std::string_view text, size_t offset, size_t& begin) {
