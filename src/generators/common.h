@@ -3,7 +3,7 @@
 //
 // A project that passes through the translator has two forms. The plain one lists the sources; the one with the name
 // prefix "build_" lists their translated copies. Writers fill a TextWriter with line feeds alone and never touch the
-// disk; generate.cpp hands the text to WriteIfChanged.
+// disk; generate.cpp hands the text to UpdateFile.
 #pragma once
 
 #include <string>
