@@ -1,5 +1,5 @@
 @import "Vesk/vxObject/IObject.h"
-namespace n { $class+ S
+namespace n { $class+ S isa vesk::IObject
 {//
 $evict { drop(); }
 $visit { v << x;
