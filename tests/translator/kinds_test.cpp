@@ -8,6 +8,16 @@ namespace {
 
 using KindsTest = TranslateTest;
 
+// Where the rest of the text is as in other cases.
+TEST_F(KindsTest, PartsOfTexts) {
+  for (const auto& [name, declared, part] : TextCasesOf("translator/parts.txt")) {
+    settings.compilableText = name.starts_with("compilable");
+    const Generated generated = TranslateHeader(declared);
+    const std::string text = Folded(name.ends_with("header") ? generated.header : generated.tail);
+    EXPECT_NE(text.find(part), text.npos) << declared << "\n" << text;
+  }
+}
+
 TEST_F(KindsTest, NeedTheRuntimesHeader) {
   for (const std::string text : {"$struct A { };", "$type int32;", "$var int32 v;", "$typedef int32 T;"}) {
     MakeWorld(TargetType::Application);
@@ -119,14 +129,6 @@ TEST_F(KindsTest, SectionsOfNodesStandOnce) {
     const std::string section = std::string(word) + " { } ";
     AssertError("$struct S {\n$dep int32 a " + section + section + "; };", 2,
                 "'" + std::string(word) + "' already specified");
-  }
-}
-
-// What of its own kind a model may hold: where accessors end, nothing repeats.
-TEST_F(KindsTest, ModelsOfTheirOwnKind) {
-  for (const auto& [name, text, expected] : TextCasesOf("translator/models_of_their_kind.txt")) {
-    const std::string header = TranslateHeader(text).header;
-    EXPECT_NE(header.find(expected), header.npos) << text << "\n" << header;
   }
 }
 

@@ -180,3 +180,121 @@ template<typename Archive> inline void Deserialise(Archive& _ar,K& _x) { _x.Dese
 
 inline vesk::xostream& operator<<(vesk::xostream& _os,K const& _x) { _os << _x._model_; return _os; }
 
+template <typename BC>
+struct N_model_mixin : public BC {
+    using typename BC::FinalClass;
+    
+    bool operator<(N_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
+    bool operator==(N_model_mixin const& _rhs) const {return _model_ == _rhs._model_;}
+    bool operator!=(N_model_mixin const& _rhs) const { return !operator==(_rhs); }
+    bool operator<=(N_model_mixin const& _rhs) const { return !_rhs.operator<(*this); }
+    bool operator>(N_model_mixin const& _rhs) const { return _rhs.operator<(*this); }
+    bool operator>=(N_model_mixin const& _rhs) const { return !operator<(_rhs); }
+    void EvictDgsNodes() const {BC::EvictDgsNodes();_model_.EvictDgsNodes();}
+    void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}
+    void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}
+    
+    static void GetsPath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=0; }
+    static vesk::Path GetsPath() { vesk::Path _path; GetsPath(_path); return _path; }
+    vesk::xset<vesk::int32> const& _model__s() const { return _model_.s; }
+    vesk::xset<vesk::int32>& _model__s() { return _model_.s; }
+    vesk::xset<vesk::int32> const& Gets() const { vesk::DataSourceReadBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s; }
+    static void GetsElementPath(vesk::Path& _path,vesk::int32 const& _k0) { vesk::octet_t* p=_path.InitLocalBuffer(5); p[0]=0; *(vesk::int32*)(p+1)=_k0; }
+    static vesk::Path GetsElementPath(vesk::int32 const& _k0) { vesk::Path _path; GetsElementPath(_path,_k0); return _path; }
+    bool InsertIntos(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Insert(_k0); }
+    bool DeleteFroms(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Delete(_k0); }
+    union {
+        struct {
+            operator vesk::xset<vesk::int32> const&() const { return CONST_ATTRIB_CAST(N_model_mixin,s)->Gets(); }
+            vesk::xset<vesk::int32> const& read() const { return CONST_ATTRIB_CAST(N_model_mixin,s)->Gets(); }
+            vesk::xset<vesk::int32> & write() { return ATTRIB_CAST(N_model_mixin,s)->Writes(); }
+            vesk::xset<vesk::int32> const& model() const { return CONST_ATTRIB_CAST(N_model_mixin,s)->_model__s(); }
+            vesk::xset<vesk::int32>& model() { return ATTRIB_CAST(N_model_mixin,s)->_model__s(); }
+            vesk::Path path() const { return CONST_ATTRIB_CAST(N_model_mixin,s)->GetsPath(); }
+            bool Insert(vesk::int32 const& _key) {
+                return ATTRIB_CAST(N_model_mixin,s)->InsertIntos(_key);
+            }
+            bool Delete(vesk::int32 const& _key) {
+                return ATTRIB_CAST(N_model_mixin,s)->DeleteFroms(_key);
+            }
+        } s;
+    };
+    typedef M model_type;
+    M const& model() const { return _model_; }
+    M& model() { return _model_; }
+    M const& read() const { vesk::DataSourceReadBarrier(static_cast<const typename BC::FinalClass*>(this), vesk::null,"N"); return _model_; }
+    M & write() { vesk::DataSourceWriteBarrier(static_cast<typename BC::FinalClass*>(this), vesk::null,"N"); return _model_; }
+    M _model_;
+};
+template <typename BC>
+struct N : public N_model_mixin<BC> {
+    typedef N_model_mixin<BC> BaseClass;
+ 
+public:
+    
+    void Serialise(vesk::Archive&) const;
+    void Deserialise(vesk::InputArchive&);
+};
+
+
+template <typename BC>
+struct A_model_mixin : public BC {
+    using typename BC::FinalClass;
+    
+    bool operator<(A_model_mixin const& _rhs) const {return _model_ < _rhs._model_;}
+    bool operator==(A_model_mixin const& _rhs) const {return _model_ == _rhs._model_;}
+    bool operator!=(A_model_mixin const& _rhs) const { return !operator==(_rhs); }
+    bool operator<=(A_model_mixin const& _rhs) const { return !_rhs.operator<(*this); }
+    bool operator>(A_model_mixin const& _rhs) const { return _rhs.operator<(*this); }
+    bool operator>=(A_model_mixin const& _rhs) const { return !operator<(_rhs); }
+    void EvictDgsNodes() const {BC::EvictDgsNodes();_model_.EvictDgsNodes();}
+    void VisitObjects(vesk::IObjectVisitor& _v) const {BC::VisitObjects(_v); _model_.VisitObjects(_v);}
+    void VisitPrefs(vesk::IPrefVisitor& _v) const {BC::VisitPrefs(_v); _model_.VisitPrefs(_v);}
+    
+    static void GetsPath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=0; }
+    static vesk::Path GetsPath() { vesk::Path _path; GetsPath(_path); return _path; }
+    vesk::xset<vesk::int32> const& _model__s() const { return _model_.s; }
+    vesk::xset<vesk::int32>& _model__s() { return _model_.s; }
+    vesk::xset<vesk::int32> const& Gets() const { vesk::DataSourceReadBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s; }
+    static void GetsElementPath(vesk::Path& _path,vesk::int32 const& _k0) { vesk::octet_t* p=_path.InitLocalBuffer(5); p[0]=0; *(vesk::int32*)(p+1)=_k0; }
+    static vesk::Path GetsElementPath(vesk::int32 const& _k0) { vesk::Path _path; GetsElementPath(_path,_k0); return _path; }
+    bool InsertIntos(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Insert(_k0); }
+    bool DeleteFroms(vesk::int32 const& _k0) { vesk::DataSourceWriteBarrier(&_model_.s,vesk::null,"M::_model_.s"); return _model_.s.Delete(_k0); }
+    union {
+        struct {
+            operator vesk::xset<vesk::int32> const&() const { return CONST_ATTRIB_CAST(A_model_mixin,s)->Gets(); }
+            vesk::xset<vesk::int32> const& read() const { return CONST_ATTRIB_CAST(A_model_mixin,s)->Gets(); }
+            vesk::xset<vesk::int32> & write() { return ATTRIB_CAST(A_model_mixin,s)->Writes(); }
+            vesk::xset<vesk::int32> const& model() const { return CONST_ATTRIB_CAST(A_model_mixin,s)->_model__s(); }
+            vesk::xset<vesk::int32>& model() { return ATTRIB_CAST(A_model_mixin,s)->_model__s(); }
+            vesk::Path path() const { return CONST_ATTRIB_CAST(A_model_mixin,s)->GetsPath(); }
+            bool Insert(vesk::int32 const& _key) {
+                return ATTRIB_CAST(A_model_mixin,s)->InsertIntos(_key);
+            }
+            bool Delete(vesk::int32 const& _key) {
+                return ATTRIB_CAST(A_model_mixin,s)->DeleteFroms(_key);
+            }
+        } s;
+    };
+    typedef M model_type;
+    M const& model() const { return _model_; }
+    M& model() { return _model_; }
+    M const& read() const { vesk::DataSourceReadBarrier(static_cast<const typename BC::FinalClass*>(this), vesk::null,"A"); return _model_; }
+    M & write() { vesk::DataSourceWriteBarrier(static_cast<typename BC::FinalClass*>(this), vesk::null,"A"); return _model_; }
+    M _model_;
+};
+template <typename BC>
+struct A : public A_model_mixin<BC> {
+    typedef A_model_mixin<BC> BaseClass;
+ 
+public:
+    
+    void Serialise(vesk::Archive&) const;
+    void Deserialise(vesk::InputArchive&);
+};
+
+template <typename BC> 
+template<typename Archive> inline void Serialise(Archive& _ar,A const& _x) { _x.Serialise(_ar); }
+template <typename BC> 
+template<typename Archive> inline void Deserialise(Archive& _ar,A& _x) { _x.Deserialise(_ar); }
+

@@ -4,3 +4,5 @@ $class+ K : model M
 {
     int more;
 };
+$mixin N : model M { };
+$mixin A << ar >> : model M { };

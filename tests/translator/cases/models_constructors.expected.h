@@ -14,7 +14,7 @@ template<> struct TypeTraits<E> {
     M(int a, int b) { }
     
     M() : flag(0),kind((E)0),n(0) {}
-    M(bool* const& flag_,E const& kind_,vesk::uint8 const& n_,vesk::xvector<vesk::int32> const& v_) : flag(flag_),kind(kind_),n(n_),v(v_) {}
+    M(bool* const& flag_,E const& kind_,vesk::uint8 const& n_,vesk::pref<vesk::IObject> const& v_) : flag(flag_),kind(kind_),n(n_),v(v_) {}
     void EvictDgsNodes() const;
     void VisitObjects(vesk::IObjectVisitor& _v) const;
     void VisitPrefs(vesk::IPrefVisitor& _v) const;
@@ -60,20 +60,16 @@ template<> struct TypeTraits<E> {
     
     static void GetvPath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=3; }
     static vesk::Path GetvPath() { vesk::Path _path; GetvPath(_path); return _path; }
-    vesk::xvector<vesk::int32> const& _model__v() const { return v; }
-    vesk::xvector<vesk::int32>& _model__v() { return v; }
-    vesk::xvector<vesk::int32> const& Getv() const { return v; }
-    void CreateIntov(vesk::ssize_t _i,vesk::int32 const* _src,vesk::ssize_t _n) {
-        v.insert(v.begin()+_i,_src,_src+_n);
-    }
-    void DeleteFromv(vesk::ssize_t _i1,vesk::ssize_t _i2) {
-        v.erase(_i1,_i2-_i1);
-    }
+    vesk::pref<vesk::IObject> const& _model__v() const { return v; }
+    vesk::pref<vesk::IObject>& _model__v() { return v; }
+    vesk::pref<vesk::IObject> const& Getv() const { return v; }
+    vesk::pref<vesk::IObject>& Writev() {  return v; }
+    void Setv(vesk::pref<vesk::IObject> const& _v) { v = _v; }
     
     bool* flag;
     E kind;
     vesk::uint8 n;
-    vesk::xvector<vesk::int32> v;
+    vesk::pref<vesk::IObject> v;
 };
 template <typename BC>
 struct M_model_mixin : public BC {
@@ -114,15 +110,11 @@ struct M_model_mixin : public BC {
     
     static void GetvPath(vesk::Path& _path) { vesk::octet_t* p=_path.InitLocalBuffer(1); p[0]=3; }
     static vesk::Path GetvPath() { vesk::Path _path; GetvPath(_path); return _path; }
-    vesk::xvector<vesk::int32> const& _model__v() const { return _model_.v; }
-    vesk::xvector<vesk::int32>& _model__v() { return _model_.v; }
-    vesk::xvector<vesk::int32> const& Getv() const { vesk::DataSourceReadBarrier(&_model_.v,vesk::null,"M::_model_.v"); return _model_.v; }
-    void CreateIntov(vesk::ssize_t _i,vesk::int32 const* _src,vesk::ssize_t _n) {
-        vesk::DataSourceWriteBarrier(&_model_.v,vesk::null,"M::_model_.v"); _model_.v.insert(_model_.v.begin()+_i,_src,_src+_n);
-    }
-    void DeleteFromv(vesk::ssize_t _i1,vesk::ssize_t _i2) {
-        vesk::DataSourceWriteBarrier(&_model_.v,vesk::null,"M::_model_.v"); _model_.v.erase(_i1,_i2-_i1);
-    }
+    vesk::pref<vesk::IObject> const& _model__v() const { return _model_.v; }
+    vesk::pref<vesk::IObject>& _model__v() { return _model_.v; }
+    vesk::pref<vesk::IObject> const& Getv() const { vesk::DataSourceReadBarrier(&_model_.v,vesk::null,"M::_model_.v"); return _model_.v; }
+    vesk::pref<vesk::IObject>& Writev() { vesk::DataSourceWriteBarrier(&_model_.v,vesk::null,"M::_model_.v");  return _model_.v; }
+    void Setv(vesk::pref<vesk::IObject> const& _v) { vesk::DataSourceWriteBarrier(&_model_.v,vesk::null,"M::_model_.v"); _model_.v = _v; }
     union {
         struct {
             operator bool* const&() const { return CONST_ATTRIB_CAST(M_model_mixin,flag)->Getflag(); }
@@ -154,39 +146,16 @@ struct M_model_mixin : public BC {
             void operator-=(vesk::uint8 const& n) { ATTRIB_CAST(M_model_mixin,n)->Offsetn(-(vesk::int8)n); }
         } n;
         struct {
-            operator vesk::xvector<vesk::int32> const&() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->Getv(); }
-            vesk::xvector<vesk::int32> const& read() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->Getv(); }
-            vesk::xvector<vesk::int32> & write() { return ATTRIB_CAST(M_model_mixin,v)->Writev(); }
-            vesk::xvector<vesk::int32> const& model() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->_model__v(); }
-            vesk::xvector<vesk::int32>& model() { return ATTRIB_CAST(M_model_mixin,v)->_model__v(); }
+            operator vesk::pref<vesk::IObject> const&() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->Getv(); }
+            vesk::pref<vesk::IObject> const& read() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->Getv(); }
+            vesk::pref<vesk::IObject> & write() { return ATTRIB_CAST(M_model_mixin,v)->Writev(); }
+            vesk::pref<vesk::IObject> const& model() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->_model__v(); }
+            vesk::pref<vesk::IObject>& model() { return ATTRIB_CAST(M_model_mixin,v)->_model__v(); }
             vesk::Path path() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->GetvPath(); }
-            void insert(vesk::ssize_t _i,vesk::int32 const* _src,vesk::ssize_t _n) {
-                ATTRIB_CAST(M_model_mixin,v)->CreateIntov(_i,_src,_n);
-            }
-            void insert(vesk::ssize_t _i,vesk::int32 const& _v) {
-                insert(_i,&_v,1);
-            }
-            void push_front(vesk::int32 const& _v) {
-                insert(0,_v);
-            }
-            void push_back(vesk::int32 const& _v) {
-                insert(model().size(),_v);
-            }
-            void erase_range(vesk::ssize_t _i1,vesk::ssize_t _i2) {
-                ATTRIB_CAST(M_model_mixin,v)->DeleteFromv(_i1,_i2);
-            }
-            void erase(vesk::ssize_t _i) {
-                erase_range(_i,_i+1);
-            }
-            void pop_front() {
-                erase(0);
-            }
-            void pop_back() {
-                erase(model().size()-1);
-            }
-            void clear() {
-                erase_range(0,model().size());
-            }
+            vesk::pref<vesk::IObject> operator->() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->Getv(); }
+            vesk::IObject operator*() const { return *CONST_ATTRIB_CAST(M_model_mixin,v)->Getv(); }
+            vesk::ptr<vesk::IObject > Get() const { return CONST_ATTRIB_CAST(M_model_mixin,v)->Getv().Get(); }
+            void operator=(vesk::pref<vesk::IObject> const& _v) { ATTRIB_CAST(M_model_mixin,v)->Setv(_v); }
         } v;
     };
     typedef M model_type;
