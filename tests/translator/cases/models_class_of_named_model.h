@@ -4,5 +4,3 @@ $class+ K : model M
 {
     int more;
 };
-$mixin N : model M { };
-$mixin A << ar >> : model M { };
